@@ -1,0 +1,17 @@
+# SPDX-License-Identifier: MIT
+# The libraries that the library and its programs are built on. Reasons: README, "Dependencies".
+find_package(PkgConfig REQUIRED)
+# libgit2 comes with a CMake package only from 1.9 on.
+pkg_check_modules(libgit2 REQUIRED IMPORTED_TARGET libgit2>=1.0)
+
+set(Boost_USE_STATIC_LIBS OFF)
+find_package(Boost 1.70 REQUIRED COMPONENTS filesystem log thread)
+
+if(VCLINK_HOST STREQUAL "source")
+    find_package(Boost 1.70 REQUIRED COMPONENTS iostreams locale stacktrace_basic)
+    find_package(Gettext REQUIRED)
+elseif(VCLINK_HOST STREQUAL "package")
+    find_package(vclink_host REQUIRED)
+else()
+    message(FATAL_ERROR "VCLINK_HOST is '${VCLINK_HOST}'; it may be 'source' or 'package'.")
+endif()

@@ -1,0 +1,31 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <string>
+
+#include "vclink_host/export.hpp"
+
+namespace fl::i18n
+{
+
+/// Names the language in which texts are produced: a POSIX locale name such as "de_DE.UTF-8" or
+/// "ja". "C", "POSIX", an empty name and a language without a catalogue all mean the texts' own
+/// English. Only language and country count; texts are always produced in UTF-8.
+class VCLINK_HOST_EXPORT VkLocale
+{
+  public:
+    VkLocale() = default;
+    explicit VkLocale(std::string name);
+
+    /// The locale of the process at this moment; vclink_host/locale.hpp sets it. At the start it
+    /// is what "LC_ALL", "LC_MESSAGES" or "LANG" name, the first that is set and not empty.
+    /// May be called from any thread.
+    static VkLocale global();
+
+    const std::string &name() const noexcept;
+
+  private:
+    std::string name_;
+};
+
+} // namespace fl::i18n

@@ -1,0 +1,27 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include "vclink/ProgressReporter.hpp"
+#include "vclink/Terminator.hpp"
+#include "vclink_host/export.hpp"
+
+namespace vclink
+{
+
+/// A back end's link to the application for one interaction. The order of the operations is
+/// binding.
+class VCLINK_HOST_EXPORT ApplicationInteractor
+{
+  public:
+    ApplicationInteractor() = default;
+    ApplicationInteractor(const ApplicationInteractor &) = delete;
+    ApplicationInteractor &operator=(const ApplicationInteractor &) = delete;
+    virtual ~ApplicationInteractor();
+
+    /// The source of cancellation, valid as long as the interactor.
+    virtual Terminator &getTerminator() = 0;
+    /// The sink of progress, valid as long as the interactor.
+    virtual ProgressReporter *getProgressReporter() = 0;
+};
+
+} // namespace vclink

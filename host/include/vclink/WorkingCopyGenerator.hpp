@@ -1,0 +1,25 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include "fl/filesystem/path.hpp"
+#include "fl/ustring.hpp"
+#include "vclink_host/export.hpp"
+
+namespace vclink
+{
+
+/// Makes working copies of repositories.
+class VCLINK_HOST_EXPORT WorkingCopyGenerator
+{
+  public:
+    WorkingCopyGenerator() = default;
+    WorkingCopyGenerator(const WorkingCopyGenerator &) = delete;
+    WorkingCopyGenerator &operator=(const WorkingCopyGenerator &) = delete;
+    virtual ~WorkingCopyGenerator();
+
+    /// @param repositorySpecifier names the repository in the back end's own terms
+    /// @param sandboxRoot the folder of the working copy to be made
+    virtual void generate(const ustring &repositorySpecifier, const upath &sandboxRoot) = 0;
+};
+
+} // namespace vclink

@@ -1,0 +1,88 @@
+// SPDX-License-Identifier: MIT
+#include <algorithm>
+
+#include <gtest/gtest.h>
+
+#include "fl/i18n/convert.hpp"
+#include "support/ElementOrder.hpp"
+#include "vclink/FileStateMap.hpp"
+
+using fl::i18n::to_string;
+using vclink_host_tests::isLessByElements;
+using vclink_host_tests::makeRandomPaths;
+
+namespace
+{
+
+bool isLess(const ustring &left, const ustring &right)
+{
+    return vclink::FileStateMap().key_comp()(upath(left), upath(right));
+}
+
+} // namespace
+
+TEST(PathOrder, PutsALeadingPartFirst)
+{
+    EXPECT_TRUE(isLess(u"/a", u"/a/b"));
+    EXPECT_FALSE(isLess(u"/a/b", u"/a"));
+    EXPECT_TRUE(isLess(u"", u"a"));
+    EXPECT_TRUE(isLess(u"", u"/"));
+    EXPECT_TRUE(isLess(u"/", u"/a"));
+    EXPECT_FALSE(isLess(u"/a", u"/a"));
+}
+
+TEST(PathOrder, ComparesElementsNotTexts)
+{
+    // As texts, '-' sorts before '/'.
+    EXPECT_TRUE(isLess(u"a/x", u"a-b/x"));
+    EXPECT_FALSE(isLess(u"a-b/x", u"a/x"));
+    EXPECT_TRUE(isLess(u"a/b/c", u"a.b"));
+    EXPECT_TRUE(isLess(u"/r/a", u"/r/a b"));
+}
+
+TEST(PathOrder, ComparesUnitsNotCodePoints)
+{
+    // U+1F600 begins with the unit D83D, which is below U+FF01.
+    EXPECT_TRUE(isLess(u"/\U0001F600", u"/\uFF01"));
+    EXPECT_FALSE(isLess(u"/\uFF01", u"/\U0001F600"));
+}
+
+TEST(PathOrder, TakesNoNoticeOfTheNativeForm)
+{
+    const auto less = vclink::FileStateMap().key_comp();
+    EXPECT_FALSE(less(upath(u"/a", true), upath(u"/a", false)));
+    EXPECT_FALSE(less(upath(u"/a", false), upath(u"/a", true)));
+}
+
+TEST(PathOrder, AgreesWithTheWalkOverTheElements)
+{
+    const auto paths = makeRandomPaths(1, 1500);
+    for (const ustring &left : paths)
+    {
+        for (const ustring &right : paths)
+        {
+            ASSERT_EQ(isLess(left, right), isLessByElements(left, right))
+                << '"' << to_string(left) << "\" \"" << to_string(right) << '"';
+        }
+    }
+}
+
+TEST(PathOrder, IsAStrictWeakOrder)
+{
+    const auto paths = makeRandomPaths(2, 90);
+    const auto isEquivalent = [](const ustring &left, const ustring &right)
+    { return !isLess(left, right) && !isLess(right, left); };
+    for (const ustring &a : paths)
+    {
+        ASSERT_FALSE(isLess(a, a));
+        for (const ustring &b : paths)
+        {
+            ASSERT_FALSE(isLess(a, b) && isLess(b, a));
+            for (const ustring &c : paths)
+            {
+                ASSERT_TRUE(!(isLess(a, b) && isLess(b, c)) || isLess(a, c));
+                ASSERT_TRUE(!(isEquivalent(a, b) && isEquivalent(b, c)) || isEquivalent(a, c));
+            }
+        }
+    }
+}

@@ -1,0 +1,46 @@
+// SPDX-License-Identifier: MIT
+#include <gtest/gtest.h>
+
+#include "support/AllocationCount.hpp"
+#include "support/ElementOrder.hpp"
+#include "vclink/FileStateMap.hpp"
+
+TEST(StandInPathOrder, AllocatesNothing)
+{
+    std::vector<upath> paths;
+    for (const ustring &text : vclink_host_tests::makeRandomPaths(3, 300))
+    {
+        paths.emplace_back(text);
+    }
+    const auto less = vclink::FileStateMap().key_comp();
+    const std::size_t before = vclink_host_tests::getAllocationCount();
+    std::size_t ordered = 0;
+    for (const upath &left : paths)
+    {
+        for (const upath &right : paths)
+        {
+            ordered += less(left, right) ? 1 : 0;
+        }
+    }
+    EXPECT_EQ(vclink_host_tests::getAllocationCount(), before);
+    EXPECT_GT(ordered, 0U);
+    EXPECT_TRUE(noexcept(less(paths[0], paths[1])));
+}
+
+TEST(StandInPathOrder, TreatsPathsOfTheSameElementsAsEquivalent)
+{
+    const auto less = vclink::FileStateMap().key_comp();
+    for (const char16_t *other : {u"/a/b/", u"//a/b", u"/a//b", u"///a///b///"})
+    {
+        EXPECT_FALSE(less(upath(u"/a/b"), upath(other)));
+        EXPECT_FALSE(less(upath(other), upath(u"/a/b")));
+    }
+}
+
+TEST(StandInPathOrder, TakesTheRootAsAnElementLikeOthers)
+{
+    const auto less = vclink::FileStateMap().key_comp();
+    EXPECT_TRUE(less(upath(u"-"), upath(u"/")));
+    EXPECT_TRUE(less(upath(u"/z"), upath(u"0")));
+    EXPECT_FALSE(less(upath(u"0"), upath(u"/z")));
+}
