@@ -1,0 +1,24 @@
+# SPDX-License-Identifier: MIT
+# The layers' sources are compiled once, as objects: the shared library shows of them what the host
+# sees, and the tests link the objects themselves and so reach what is hidden.
+add_library(vclink_git_objects OBJECT)
+vclink_configure_target(vclink_git_objects)
+target_include_directories(vclink_git_objects PUBLIC
+    ${PROJECT_SOURCE_DIR} ${PROJECT_SOURCE_DIR}/include)
+target_link_libraries(vclink_git_objects PUBLIC
+    vclink::host Boost::headers Boost::filesystem Boost::thread PkgConfig::libgit2)
+
+add_library(vclink_git SHARED)
+add_library(vclink::git ALIAS vclink_git)
+vclink_configure_target(vclink_git)
+target_link_libraries(vclink_git
+    PRIVATE vclink_git_objects
+    PUBLIC vclink::host Boost::headers)
+target_include_directories(vclink_git PUBLIC
+    $<BUILD_INTERFACE:${PROJECT_SOURCE_DIR}/include>
+    $<INSTALL_INTERFACE:${CMAKE_INSTALL_INCLUDEDIR}>)
+set_target_properties(vclink_git PROPERTIES
+    VERSION ${PROJECT_VERSION}
+    SOVERSION ${PROJECT_VERSION_MAJOR}
+    LIBRARY_OUTPUT_DIRECTORY "${VCLINK_STAGE_DIR}/${CMAKE_INSTALL_LIBDIR}")
+target_link_options(vclink_git PRIVATE -Wl,--as-needed -Wl,--no-undefined)

@@ -1,0 +1,44 @@
+// SPDX-License-Identifier: MIT
+#include "error/errorUtil/rethrowAsGitException.hpp"
+
+#include <exception>
+
+#include <boost/exception/diagnostic_information.hpp>
+
+#include "error/logging/logger.hpp"
+#include "fl/i18n/convert.hpp"
+#include "foundation/core/except/IUserException.hpp"
+#include "vclink/git/GitException.hpp"
+
+namespace vclink::git
+{
+namespace
+{
+
+/// The text of the exception in flight; one without a text leaves as it is.
+ustring textOfCurrentException()
+{
+    try
+    {
+        throw;
+    }
+    catch (const foundation::core::except::IUserException &exception)
+    {
+        return exception.GetUnicodeMessageTxt();
+    }
+    catch (const std::exception &exception)
+    {
+        return fl::i18n::to_ustring(exception.what());
+    }
+}
+
+} // namespace
+
+void rethrowAsGitException(const resource_core::BaseMsgID &id)
+{
+    writeRecord(SeverityException, "Exception caught: ",
+                [] { return boost::current_exception_diagnostic_information(true); });
+    throw GitException(id, textOfCurrentException());
+}
+
+} // namespace vclink::git

@@ -1,0 +1,44 @@
+// SPDX-License-Identifier: MIT
+#include "vclink/git/messageIdentifiers.hpp"
+
+namespace shared_vclink::git
+{
+
+const char *const detail::catalogue = "shared_vclink:git";
+
+HasConflicts::HasConflicts() : BaseMsgID({}, detail::catalogue, "HasConflicts")
+{
+}
+
+UnableToMergeBadRepositoryState::UnableToMergeBadRepositoryState()
+    : BaseMsgID({}, detail::catalogue, "UnableToMergeBadRepositoryState")
+{
+}
+
+MergePreferenceFastForward::MergePreferenceFastForward()
+    : BaseMsgID({}, detail::catalogue, "MergePreferenceFastForward")
+{
+}
+
+NoFilesToRemove::NoFilesToRemove() : BaseMsgID({}, detail::catalogue, "NoFilesToRemove")
+{
+}
+
+NoUserName::NoUserName() : BaseMsgID({}, detail::catalogue, "NoUserName")
+{
+}
+
+// Defined here, so that each class's type information has one home that the host can link to.
+LibGit2Error::~LibGit2Error() = default;
+MergeFailed::~MergeFailed() = default;
+HasConflicts::~HasConflicts() = default;
+UnableToMergeBadRepositoryState::~UnableToMergeBadRepositoryState() = default;
+MergePreferenceFastForward::~MergePreferenceFastForward() = default;
+AlreadyAdded::~AlreadyAdded() = default;
+NoFilesToRemove::~NoFilesToRemove() = default;
+Conflicted::~Conflicted() = default;
+NoUserName::~NoUserName() = default;
+InvalidGitAttributeValue::~InvalidGitAttributeValue() = default;
+ProgressCallbackCheckoutMessage::~ProgressCallbackCheckoutMessage() = default;
+
+} // namespace shared_vclink::git

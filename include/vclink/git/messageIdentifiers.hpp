@@ -1,0 +1,170 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <string>
+
+#include "fl/ustring.hpp"
+#include "resource_core/BaseMsgID.hpp"
+#include "vclink/git/export.hpp"
+
+/// The messages of the catalogue "shared_vclink:git". Each class is named like its key, and takes
+/// the message's arguments. The ones without an exception class of their own say so; each of the
+/// others is raised as foundation::core::except::Exception<Identifier,
+/// vclink::exception::SourceControlException>, by which a host catches it.
+namespace shared_vclink::git
+{
+namespace detail
+{
+
+VCLINK_GIT_EXPORT extern const char *const catalogue;
+
+inline resource_core::MsgArgument makeArgument(const char *text)
+{
+    return std::string(text);
+}
+inline resource_core::MsgArgument makeArgument(const std::string &text)
+{
+    return text;
+}
+inline resource_core::MsgArgument makeArgument(const ustring &text)
+{
+    return text;
+}
+
+} // namespace detail
+
+/// A call of libgit2 failed; raised as vclink::git::LibGit2Exception.
+class VCLINK_GIT_EXPORT LibGit2Error : public resource_core::BaseMsgID
+{
+  public:
+    /// @param code libgit2's return code
+    /// @param errorClass libgit2's error class
+    /// @param text libgit2's text
+    template <class Text>
+    LibGit2Error(long code, long errorClass, const Text &text)
+        : BaseMsgID({code, errorClass, detail::makeArgument(text)}, detail::catalogue,
+                    "LibGit2Error")
+    {
+    }
+    LibGit2Error(const LibGit2Error &) = default;
+    ~LibGit2Error() override;
+};
+
+/// A merge failed; raised as vclink::git::GitException, whose added text tells the cause.
+class VCLINK_GIT_EXPORT MergeFailed : public resource_core::BaseMsgID
+{
+  public:
+    /// @param branchName what was to be merged, UTF-8
+    template <class Text>
+    explicit MergeFailed(const Text &branchName)
+        : BaseMsgID({detail::makeArgument(branchName)}, detail::catalogue, "MergeFailed")
+    {
+    }
+    MergeFailed(const MergeFailed &) = default;
+    ~MergeFailed() override;
+};
+
+/// A merge left conflicts.
+class VCLINK_GIT_EXPORT HasConflicts : public resource_core::BaseMsgID
+{
+  public:
+    HasConflicts();
+    HasConflicts(const HasConflicts &) = default;
+    ~HasConflicts() override;
+};
+
+/// A merge was asked for while another operation is in progress.
+class VCLINK_GIT_EXPORT UnableToMergeBadRepositoryState : public resource_core::BaseMsgID
+{
+  public:
+    UnableToMergeBadRepositoryState();
+    UnableToMergeBadRepositoryState(const UnableToMergeBadRepositoryState &) = default;
+    ~UnableToMergeBadRepositoryState() override;
+};
+
+/// The configuration allows fast-forwards only, and a true merge is needed.
+class VCLINK_GIT_EXPORT MergePreferenceFastForward : public resource_core::BaseMsgID
+{
+  public:
+    MergePreferenceFastForward();
+    MergePreferenceFastForward(const MergePreferenceFastForward &) = default;
+    ~MergePreferenceFastForward() override;
+};
+
+/// Files that were to be added are known to Git already.
+class VCLINK_GIT_EXPORT AlreadyAdded : public resource_core::BaseMsgID
+{
+  public:
+    /// @param files the report of the files
+    template <class Text>
+    explicit AlreadyAdded(const Text &files)
+        : BaseMsgID({detail::makeArgument(files)}, detail::catalogue, "AlreadyAdded")
+    {
+    }
+    AlreadyAdded(const AlreadyAdded &) = default;
+    ~AlreadyAdded() override;
+};
+
+/// Nothing of what was named can be removed.
+class VCLINK_GIT_EXPORT NoFilesToRemove : public resource_core::BaseMsgID
+{
+  public:
+    NoFilesToRemove();
+    NoFilesToRemove(const NoFilesToRemove &) = default;
+    ~NoFilesToRemove() override;
+};
+
+/// Files that were to be reverted are in conflict.
+class VCLINK_GIT_EXPORT Conflicted : public resource_core::BaseMsgID
+{
+  public:
+    /// @param files the report of the files
+    template <class Text>
+    explicit Conflicted(const Text &files)
+        : BaseMsgID({detail::makeArgument(files)}, detail::catalogue, "Conflicted")
+    {
+    }
+    Conflicted(const Conflicted &) = default;
+    ~Conflicted() override;
+};
+
+/// No name for a commit's author can be found.
+class VCLINK_GIT_EXPORT NoUserName : public resource_core::BaseMsgID
+{
+  public:
+    NoUserName();
+    NoUserName(const NoUserName &) = default;
+    ~NoUserName() override;
+};
+
+/// libgit2 gave an attribute value of a kind that is not known; raised as
+/// vclink::git::GitException.
+class VCLINK_GIT_EXPORT InvalidGitAttributeValue : public resource_core::BaseMsgID
+{
+  public:
+    /// @param value the raw value, UTF-8
+    template <class Text>
+    explicit InvalidGitAttributeValue(const Text &value)
+        : BaseMsgID({detail::makeArgument(value)}, detail::catalogue, "InvalidGitAttributeValue")
+    {
+    }
+    InvalidGitAttributeValue(const InvalidGitAttributeValue &) = default;
+    ~InvalidGitAttributeValue() override;
+};
+
+/// The step that a checkout has reached. Not raised: a progress text.
+class VCLINK_GIT_EXPORT ProgressCallbackCheckoutMessage : public resource_core::BaseMsgID
+{
+  public:
+    /// @param path the file, relative to the root
+    template <class Text>
+    explicit ProgressCallbackCheckoutMessage(const Text &path)
+        : BaseMsgID({detail::makeArgument(path)}, detail::catalogue,
+                    "ProgressCallbackCheckoutMessage")
+    {
+    }
+    ProgressCallbackCheckoutMessage(const ProgressCallbackCheckoutMessage &) = default;
+    ~ProgressCallbackCheckoutMessage() override;
+};
+
+} // namespace shared_vclink::git
