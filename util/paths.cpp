@@ -1,0 +1,154 @@
+// SPDX-License-Identifier: MIT
+#include "util/paths.hpp"
+
+#include <algorithm>
+#include <climits>
+#include <cstdint>
+#include <cstring>
+#include <string_view>
+
+#include <boost/filesystem/operations.hpp>
+
+#include "fl/filesystem/detail/path_text.hpp"
+#include "fl/i18n/convert.hpp"
+
+namespace vclink::git
+{
+namespace
+{
+
+namespace fs = boost::filesystem;
+
+bool isName(std::string_view element)
+{
+    return !element.empty() && element != "." && element != "..";
+}
+
+/// A path cut into a folder that is given without "." and "..", and a name in it: the two can be
+/// resolved one after the other. No folder where the path can't be cut so.
+struct NameInFolder
+{
+    std::string_view folder;
+    std::string_view name;
+};
+
+NameInFolder cut(std::string_view path)
+{
+    const std::size_t slash = path.rfind('/');
+    // Longer than the system takes: refused as a whole, not followed element by element.
+    const bool isTooLong = path.size() >= PATH_MAX;
+    if (isTooLong || slash == std::string_view::npos || slash == 0 ||
+        !isName(path.substr(slash + 1)))
+    {
+        return {};
+    }
+    const std::string_view folder = path.substr(0, slash);
+    for (std::size_t begin = folder.front() == '/' ? 1 : 0; begin <= folder.size();)
+    {
+        const std::size_t end = std::min(folder.find('/', begin), folder.size());
+        if (!isName(folder.substr(begin, end - begin)))
+        {
+            return {};
+        }
+        begin = end + 1;
+    }
+    return {folder, path.substr(slash + 1)};
+}
+
+bool isAscii(std::string_view text)
+{
+    constexpr std::uint64_t highBits = 0x8080808080808080U;
+    std::uint64_t seen = 0;
+    for (; text.size() >= sizeof seen; text.remove_prefix(sizeof seen))
+    {
+        std::uint64_t word = 0;
+        std::memcpy(&word, text.data(), sizeof word);
+        seen |= word;
+    }
+    for (const char unit : text)
+    {
+        seen |= static_cast<unsigned char>(unit);
+    }
+    return (seen & highBits) == 0;
+}
+
+/// Appends an ASCII name, which is not empty, without a conversion of its own: this runs once for
+/// each file of a status walk. The separator is still the host's affair, which sees how the name
+/// begins.
+void appendAsciiName(ustring &text, std::string_view name, bool native)
+{
+    const ustring beginning(1, static_cast<char16_t>(name.front()));
+    fl::filesystem::detail::concatenate_pathname(text, beginning, native);
+    name.remove_prefix(1);
+    const std::size_t start = text.size();
+    text.resize(start + name.size());
+    std::transform(name.begin(), name.end(), text.begin() + static_cast<std::ptrdiff_t>(start),
+                   [](char unit) { return static_cast<char16_t>(unit); });
+}
+
+} // namespace
+
+RootRelativePaths::RootRelativePaths(const upath &root)
+    : given_(fl::i18n::ustring_to_utf8(root.string())), root_(fs::weakly_canonical(given_))
+{
+}
+
+std::string RootRelativePaths::relative(const upath &path)
+{
+    std::string text = resolve(fl::i18n::ustring_to_utf8(path.string()));
+    std::replace(text.begin(), text.end(), '\\', '/');
+    return text;
+}
+
+std::string RootRelativePaths::resolve(const std::string &path)
+{
+    const auto [folder, name] = cut(path);
+    const FolderBelowRoot below =
+        folder.empty() ? FolderBelowRoot() : findFolder(std::string(folder));
+    if (!below || fs::is_symlink(fs::symlink_status(path)))
+    {
+        return fs::weakly_canonical(path).lexically_relative(root_).string();
+    }
+    return (*below == "." ? std::string() : *below + '/').append(name);
+}
+
+const RootRelativePaths::FolderBelowRoot &RootRelativePaths::findFolder(const std::string &folder)
+{
+    const auto known = folders_.find(folder);
+    if (known != folders_.end())
+    {
+        return known->second;
+    }
+    // Step by step only from the root on: above it nothing would be found below it.
+    const bool isGivenBelow = folder.size() > given_.size() && folder.rfind(given_ + '/', 0) == 0;
+    const std::string relative =
+        isGivenBelow ? resolve(folder)
+                     : fs::weakly_canonical(folder).lexically_relative(root_).string();
+    const bool isBelow = !relative.empty() && relative != ".." && relative.rfind("../", 0) != 0;
+    return folders_.emplace(folder, FolderBelowRoot(isBelow, relative)).first->second;
+}
+
+ustring relativeToRoot(const upath &root, const upath &path)
+{
+    return fl::i18n::utf8_to_ustring(RootRelativePaths(root).relative(path));
+}
+
+upath joinRepositoryPath(const upath &root, const char *name)
+{
+    const std::string_view added(name);
+    ustring text;
+    text.reserve(root.string().size() + 1 + added.size());
+    text = root.string();
+    if (!added.empty() && isAscii(added))
+    {
+        appendAsciiName(text, added, root.native());
+    }
+    else if (!added.empty())
+    {
+        const ustring converted = fl::i18n::utf8_to_ustring(name);
+        fl::filesystem::detail::concatenate_pathname(text, converted, root.native());
+    }
+    return upath(std::move(text), root.native());
+}
+
+} // namespace vclink::git

@@ -1,0 +1,81 @@
+// SPDX-License-Identifier: MIT
+#include "util/repository.hpp"
+
+#include <git2.h>
+
+#include "fl/i18n/convert.hpp"
+
+namespace vclink::git
+{
+
+bool isRepository(const upath &path)
+{
+    const std::string folder = fl::i18n::ustring_to_utf8(path.string());
+    const GitResult<void> probe = makeResult(
+        git_repository_open_ext(nullptr, folder.c_str(), GIT_REPOSITORY_OPEN_NO_SEARCH, nullptr));
+    if (probe.has_error() && probe.error().getCode() == GIT_ENOTFOUND)
+    {
+        return false;
+    }
+    probe.value();
+    return true;
+}
+
+OwnedHandle<git_repository> openRepository(const upath &root)
+{
+    const std::string folder = fl::i18n::ustring_to_utf8(root.string());
+    return acquire<git_repository>(git_repository_open_ext, folder.c_str(),
+                                   GIT_REPOSITORY_OPEN_NO_SEARCH, nullptr)
+        .value();
+}
+
+OwnedHandle<git_index> getRepositoryIndex(git_repository *repository)
+{
+    return acquire<git_index>(git_repository_index, repository).value();
+}
+
+void writeIndex(git_index *index)
+{
+    makeResult(git_index_write(index)).value();
+}
+
+git_oid writeIndexTree(git_index *index)
+{
+    git_oid id{};
+    makeResult(git_index_write_tree(&id, index)).value();
+    return id;
+}
+
+OwnedHandle<git_tree> lookupTree(git_repository *repository, const git_oid *id)
+{
+    return acquire<git_tree>(git_tree_lookup, repository, id).value();
+}
+
+GitResult<OwnedHandle<git_object>> revparseObject(git_repository *repository,
+                                                  const std::string &spec)
+{
+    return acquire<git_object>(git_revparse_single, repository, spec.c_str());
+}
+
+const git_oid *revparseId(const std::string &spec, git_repository *repository)
+{
+    // libgit2's cache refuses blobs and objects over 4 KiB, so that releasing the object may free
+    // the id that lies in it. The copy is taken before.
+    thread_local git_oid copy;
+    const OwnedHandle<git_object> object = revparseObject(repository, spec).value();
+    git_oid_cpy(&copy, git_object_id(object.get()));
+    return &copy;
+}
+
+GitResult<OwnedHandle<git_commit>> lookupCommitByName(const char *name, git_repository *repository)
+{
+    const auto reference = acquire<git_reference>(git_reference_dwim, repository, name);
+    if (reference.has_error())
+    {
+        return reference.error();
+    }
+    return acquire<git_commit>(git_commit_lookup, repository,
+                               git_reference_target(reference.value().get()));
+}
+
+} // namespace vclink::git
