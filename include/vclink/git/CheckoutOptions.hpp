@@ -1,0 +1,21 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <cstdint>
+
+#include "vclink/git/export.hpp"
+
+namespace vclink::git
+{
+
+/// What a checkout is told. A plain value.
+class VCLINK_GIT_EXPORT CheckoutOptions
+{
+  public:
+    CheckoutOptions();
+
+    /// libgit2's git_checkout_strategy_t flags, in the low 32 bits. GIT_CHECKOUT_SAFE at the start.
+    std::uint64_t checkoutStrategy;
+};
+
+} // namespace vclink::git

@@ -1,0 +1,49 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <git2/checkout.h>
+#include <git2/clone.h>
+#include <git2/merge.h>
+#include <git2/proxy.h>
+#include <git2/remote.h>
+
+#include "error/errorUtil/GitResult.hpp"
+#include "options/GitCallbacks.hpp"
+#include "vclink/git/CheckoutOptions.hpp"
+#include "vclink/git/CloneOptions.hpp"
+#include "vclink/git/FetchOptions.hpp"
+#include "vclink/git/MergeOptions.hpp"
+#include "vclink/git/ProxyOptions.hpp"
+#include "vclink/git/PushOptions.hpp"
+
+/// Conversions of an option value and a callback set to the record that libgit2 takes, made right
+/// before the call that needs it. A record holds no memory of its own; what it points at, the
+/// value's strings and the callback set, must outlive the call. Each raises what GitErrorPolicy
+/// raises when libgit2 refuses to initialise the record.
+namespace vclink::git
+{
+
+/// A record zeroed and initialised by libgit2.
+/// @throws LibGit2Exception when `init` fails
+template <class Record, class Version>
+Record initGitRecord(int (*init)(Record *, Version), Version version)
+{
+    Record record{};
+    makeResult(init(&record, version)).value();
+    return record;
+}
+
+/// git_proxy_options_init; neither argument is read, and no proxy is used.
+git_proxy_options toGitProxyOptions(const ProxyOptions &options, ProxyCallbacks &callbacks);
+
+/// git_merge_options_init; nothing of the value is read.
+git_merge_options toGitMergeOptions(const MergeOptions &options);
+
+git_checkout_options toGitCheckoutOptions(const CheckoutOptions &options,
+                                          CheckoutCallbacks &callbacks);
+git_remote_callbacks toGitRemoteCallbacks(RemoteCallbacks &callbacks);
+git_fetch_options toGitFetchOptions(const FetchOptions &options, GitCallbacks &callbacks);
+git_push_options toGitPushOptions(const PushOptions &options, GitCallbacks &callbacks);
+git_clone_options toGitCloneOptions(const CloneOptions &options, GitCallbacks &callbacks);
+
+} // namespace vclink::git
