@@ -1,0 +1,61 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <cstddef>
+#include <memory>
+#include <vector>
+
+#include <git2/types.h>
+
+#include "error/errorUtil/GitDeleters.hpp"
+#include "fl/filesystem/path.hpp"
+#include "fl/ustring.hpp"
+#include "options/GitCallbacks.hpp"
+#include "vclink/ApplicationInteractor.hpp"
+#include "vclink/CMAdapter.hpp"
+#include "vclink/FileStateMap.hpp"
+#include "vclink/git/GitOptionsFactory.hpp"
+#include "vclink/git/LibGit2Guard.hpp"
+
+namespace vclink::git
+{
+
+/// The back end of one working copy. Holds what it needs to open the repository and to build option
+/// records, and nothing of the repository itself. See GitAdapterFactory::createAdapterFor.
+class GitAdapter : public vclink::CMAdapter
+{
+  public:
+    /// @param interactor not null
+    GitAdapter(const upath &root, std::shared_ptr<ApplicationInteractor> interactor);
+    /// @param factory not null, and made with an interactor
+    GitAdapter(const upath &root, std::shared_ptr<GitOptionsFactory> factory);
+    ~GitAdapter() override;
+
+    void commit(const upath &folder, const ustring &message) override;
+    void addFiles(const std::vector<upath> &files) override;
+    void removeFiles(const std::vector<upath> &files) override;
+    void revertFiles(const std::vector<upath> &files) override;
+    void markResolved(const upath &file) override;
+    FileStateMap getFileStates(const std::vector<upath> &files) override;
+    FileStateMap getFolderStates(const upath &folder) override;
+    const upath &getRootFolder() override;
+
+    /// A repository opened for the caller, who owns it.
+    /// @throws LibGit2Exception
+    OwnedHandle<git_repository> getRepository() const;
+    std::shared_ptr<GitOptionsFactory> getOptionsFactory() const;
+    GitCallbacks &getCallbacks() const;
+    std::shared_ptr<ApplicationInteractor> getInteractor() const;
+
+  private:
+    FileStateMap collectFileStates(char **pathspecStrings, std::size_t pathspecCount);
+
+    // The guard comes first and goes last: all use of libgit2 by the other members ends before it.
+    LibGit2Guard guard_;
+    upath root_;
+    std::shared_ptr<GitOptionsFactory> optionsFactory_;
+    std::unique_ptr<GitCallbacks> callbacks_;
+    std::shared_ptr<ApplicationInteractor> interactor_;
+};
+
+} // namespace vclink::git
