@@ -1,0 +1,22 @@
+# SPDX-License-Identifier: MIT
+# vclink_add_tests(TARGET LABELS label... SOURCES file... [LIBRARIES library...]): an executable of
+# GoogleTest cases, each a test of ctest. It links the layers' objects, so that what the library
+# hides can be tested too.
+#
+# vclink_thread_tests builds the executables whose tests are labelled "threads" and nothing else, for
+# the builds under ThreadSanitizer.
+add_custom_target(vclink_thread_tests)
+
+function(vclink_add_tests target)
+    cmake_parse_arguments(PARSE_ARGV 1 arg "" "" "LABELS;SOURCES;LIBRARIES")
+    add_executable(${target} ${arg_SOURCES})
+    vclink_configure_target(${target})
+    target_link_libraries(${target} PRIVATE
+        vclink_git_objects vclink_test_support ${arg_LIBRARIES} GTest::gmock GTest::gtest_main)
+    if("threads" IN_LIST arg_LABELS)
+        add_dependencies(vclink_thread_tests ${target})
+    endif()
+    gtest_discover_tests(${target}
+        DISCOVERY_TIMEOUT 60
+        PROPERTIES LABELS "${arg_LABELS}" TIMEOUT 300)
+endfunction()

@@ -1,0 +1,65 @@
+// SPDX-License-Identifier: MIT
+// The rules on this repository as it stands.
+#include <set>
+#include <string>
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include "rules.hpp"
+
+namespace
+{
+
+using namespace vclink::test;
+using testing::IsEmpty;
+using testing::IsSupersetOf;
+
+class Repository : public testing::Test
+{
+  protected:
+    const SourceTree tree =
+        readSourceTree(VCLINK_SOURCE_FOLDER, {"host", "include", "error", "util", "options", "main",
+                                              "examples", "tests", "bench", "fuzz"});
+};
+
+TEST_F(Repository, IsSeenWithAllItsLayers)
+{
+    std::set<std::string> layers;
+    for (const auto &entry : tree)
+        layers.insert(layerOf(entry.first));
+    EXPECT_THAT(layers, IsSupersetOf({"host", "include", "error", "util", "options", "main",
+                                      "examples", "tests"}));
+}
+
+TEST_F(Repository, KeepsTheOrderOfItsLayers)
+{
+    EXPECT_THAT(findBrokenLayers(tree), IsEmpty());
+}
+
+TEST_F(Repository, ExportsHeadersThatShowNoLibraryBelow)
+{
+    EXPECT_THAT(findForeignIncludesOfExportedHeaders(tree), IsEmpty());
+}
+
+TEST_F(Repository, BuildsItsLibraryWithoutTheHostsControls)
+{
+    EXPECT_THAT(findUseOfHostControls(tree), IsEmpty());
+}
+
+TEST_F(Repository, KeepsEachHeavyLibraryInOneSourceFile)
+{
+    EXPECT_THAT(findSpreadHeavyLibraries(tree), IsEmpty());
+}
+
+TEST_F(Repository, BeginsEveryHeaderWithItsLicenceAndPragma)
+{
+    EXPECT_THAT(findHeadersWithoutProlog(tree), IsEmpty());
+}
+
+TEST_F(Repository, WritesSourcePositionsOfTheLibraryAsText)
+{
+    EXPECT_THAT(findLineMacros(tree), IsEmpty());
+}
+
+} // namespace

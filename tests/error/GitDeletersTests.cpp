@@ -1,0 +1,182 @@
+// SPDX-License-Identifier: MIT
+#include "error/errorUtil/GitDeleters.hpp"
+
+#include <cstring>
+#include <string>
+#include <type_traits>
+#include <utility>
+#include <vector>
+
+#include <dlfcn.h>
+#include <git2.h>
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include "error/errorUtil/GitResult.hpp"
+#include "support/GitTest.hpp"
+#include "support/LibGit2Session.hpp"
+
+namespace
+{
+
+using Release = std::pair<std::string, const void *>;
+
+std::vector<Release> releases;
+
+template <class Handle> void noteAndForward(const char *name, Handle *handle)
+{
+    releases.emplace_back(name, handle);
+    void *const symbol = dlsym(RTLD_NEXT, name);
+    void (*forward)(Handle *) = nullptr;
+    static_assert(sizeof(forward) == sizeof(symbol));
+    std::memcpy(&forward, &symbol, sizeof(forward));
+    forward(handle);
+}
+
+} // namespace
+
+// This program's own definitions go before libgit2's, which they note and call.
+#define NOTE_RELEASES_OF(Handle)                                                                   \
+    extern "C" void Handle##_free(Handle *handle)                                                  \
+    {                                                                                              \
+        noteAndForward(#Handle "_free", handle);                                                   \
+    }
+NOTE_RELEASES_OF(git_annotated_commit)
+NOTE_RELEASES_OF(git_branch_iterator)
+NOTE_RELEASES_OF(git_commit)
+NOTE_RELEASES_OF(git_config)
+NOTE_RELEASES_OF(git_index)
+NOTE_RELEASES_OF(git_index_conflict_iterator)
+NOTE_RELEASES_OF(git_object)
+NOTE_RELEASES_OF(git_odb)
+NOTE_RELEASES_OF(git_odb_object)
+NOTE_RELEASES_OF(git_reference)
+NOTE_RELEASES_OF(git_remote)
+NOTE_RELEASES_OF(git_repository)
+NOTE_RELEASES_OF(git_signature)
+NOTE_RELEASES_OF(git_tree)
+
+namespace vclink::git
+{
+namespace
+{
+
+using testing::IsEmpty;
+
+template <class... Handles>
+constexpr bool releasesAll = (std::is_invocable_r_v<void, const GitDeleters &, Handles *> && ...);
+static_assert(
+    releasesAll<git_annotated_commit, git_branch_iterator, git_commit, git_config, git_index,
+                git_index_conflict_iterator, git_object, git_odb, git_odb_object, git_reference,
+                git_remote, git_repository, git_signature, git_tree>);
+static_assert(!std::is_invocable_v<GitDeleters, git_blob *> &&
+              !std::is_invocable_v<GitDeleters, void *>);
+static_assert(std::is_empty_v<GitDeleters>, "an owning handle is as large as a pointer");
+static_assert(std::is_same_v<OwnedHandle<git_tree>, std::unique_ptr<git_tree, GitDeleters>>);
+
+class GitDeletersTest : public test::GitTest
+{
+  protected:
+    GitDeletersTest()
+    {
+        test::GitRepository copy = makeRepository();
+        copy.write("file", "text");
+        copy.commitAll("first");
+        repository_ = acquire<git_repository>(git_repository_open, copy.path().c_str()).value();
+        git_oid id;
+        git_reference_name_to_id(&id, repository_.get(), "HEAD");
+        commit_ = acquire<git_commit>(git_commit_lookup, repository_.get(), &id).value();
+    }
+
+    /// Expects that the handle is released once, by this function.
+    template <class Handle>
+    static void expectReleasedBy(const std::string &function, GitResult<OwnedHandle<Handle>> made)
+    {
+        OwnedHandle<Handle> handle = std::move(made).value();
+        const void *const raw = handle.get();
+        ASSERT_NE(raw, nullptr) << function;
+        releases.clear();
+        handle.reset();
+        ASSERT_FALSE(releases.empty()) << function;
+        EXPECT_EQ(releases.front(), Release(function, raw));
+    }
+
+    git_repository *repository() const
+    {
+        return repository_.get();
+    }
+    git_commit *commit() const
+    {
+        return commit_.get();
+    }
+
+  private:
+    test::LibGit2Session session_{environment()};
+    OwnedHandle<git_repository> repository_;
+    OwnedHandle<git_commit> commit_;
+};
+
+TEST_F(GitDeletersTest, ReleasesWhatIsLookedUp)
+{
+    const git_oid *const id = git_commit_id(commit());
+    expectReleasedBy<git_commit>("git_commit_free",
+                                 acquire<git_commit>(git_commit_lookup, repository(), id));
+    expectReleasedBy<git_object>(
+        "git_object_free",
+        acquire<git_object>(git_object_lookup, repository(), id, GIT_OBJECT_ANY));
+    expectReleasedBy<git_tree>("git_tree_free", acquire<git_tree>(git_commit_tree, commit()));
+    expectReleasedBy<git_annotated_commit>(
+        "git_annotated_commit_free",
+        acquire<git_annotated_commit>(git_annotated_commit_lookup, repository(), id));
+    const OwnedHandle<git_odb> store = acquire<git_odb>(git_repository_odb, repository()).value();
+    expectReleasedBy<git_odb_object>("git_odb_object_free",
+                                     acquire<git_odb_object>(git_odb_read, store.get(), id));
+}
+
+TEST_F(GitDeletersTest, ReleasesWhatBelongsToARepository)
+{
+    expectReleasedBy<git_repository>(
+        "git_repository_free",
+        acquire<git_repository>(git_repository_open, git_repository_path(repository())));
+    expectReleasedBy<git_config>("git_config_free",
+                                 acquire<git_config>(git_repository_config, repository()));
+    expectReleasedBy<git_odb>("git_odb_free", acquire<git_odb>(git_repository_odb, repository()));
+    expectReleasedBy<git_index>("git_index_free",
+                                acquire<git_index>(git_repository_index, repository()));
+    const OwnedHandle<git_index> index =
+        acquire<git_index>(git_repository_index, repository()).value();
+    expectReleasedBy<git_index_conflict_iterator>(
+        "git_index_conflict_iterator_free",
+        acquire<git_index_conflict_iterator>(git_index_conflict_iterator_new, index.get()));
+}
+
+TEST_F(GitDeletersTest, ReleasesReferencesRemotesAndSignatures)
+{
+    expectReleasedBy<git_reference>("git_reference_free",
+                                    acquire<git_reference>(git_repository_head, repository()));
+    expectReleasedBy<git_branch_iterator>(
+        "git_branch_iterator_free",
+        acquire<git_branch_iterator>(git_branch_iterator_new, repository(), GIT_BRANCH_ALL));
+    expectReleasedBy<git_remote>("git_remote_free",
+                                 acquire<git_remote>(git_remote_create_detached, "/nowhere"));
+    expectReleasedBy<git_signature>(
+        "git_signature_free",
+        acquire<git_signature>(git_signature_new, "Name", "name@example.org", 0, 0));
+}
+
+template <class... Handles> void releaseNulls()
+{
+    (GitDeleters()(static_cast<Handles *>(nullptr)), ...);
+}
+
+TEST(GitDeleters, PassNoNullOn)
+{
+    releases.clear();
+    releaseNulls<git_annotated_commit, git_branch_iterator, git_commit, git_config, git_index,
+                 git_index_conflict_iterator, git_object, git_odb, git_odb_object, git_reference,
+                 git_remote, git_repository, git_signature, git_tree>();
+    EXPECT_THAT(releases, IsEmpty());
+}
+
+} // namespace
+} // namespace vclink::git

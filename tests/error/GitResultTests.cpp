@@ -1,0 +1,194 @@
+// SPDX-License-Identifier: MIT
+#include "error/errorUtil/GitResult.hpp"
+
+#include <string>
+#include <type_traits>
+
+#include <boost/exception/get_error_info.hpp>
+#include <git2.h>
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include "error/HermeticLibGit2.hpp"
+#include "error/logging/severity.hpp"
+#include "support/LogCapture.hpp"
+#include "vclink/git/LibGit2Exception.hpp"
+
+namespace vclink::git
+{
+namespace
+{
+
+using test::HermeticLibGit2;
+using test::LogCapture;
+using testing::ElementsAre;
+using testing::IsEmpty;
+
+/// Looks into results past their checks, as only a policy can.
+struct Peek : boost::outcome_v2::policy::base
+{
+    template <class Result> static const GitError &error(const Result &result)
+    {
+        return _error(result);
+    }
+    /// A result that was never given anything.
+    template <class Result> static Result emptied(Result result)
+    {
+        _set_has_value(result, false);
+        _set_has_error(result, false);
+        return result;
+    }
+};
+
+template <class Value> constexpr bool isValueType()
+{
+    using Result = GitResult<Value>;
+    static_assert(
+        std::is_same_v<Result, boost::outcome_v2::basic_result<Value, GitError, GitErrorPolicy>>);
+    return std::is_same_v<typename Result::value_type, Value> &&
+           std::is_same_v<typename Result::error_type, GitError> &&
+           std::is_constructible_v<Result, GitError>;
+}
+static_assert(isValueType<void>() && isValueType<git_oid>() && isValueType<const char *>());
+static_assert(isValueType<git_checkout_options>() && isValueType<git_clone_options>() &&
+              isValueType<git_fetch_options>() && isValueType<git_merge_options>() &&
+              isValueType<git_proxy_options>() && isValueType<git_push_options>() &&
+              isValueType<git_remote_callbacks>() && isValueType<git_status_options>());
+static_assert(isValueType<OwnedHandle<git_annotated_commit>>() &&
+              isValueType<OwnedHandle<git_branch_iterator>>() &&
+              isValueType<OwnedHandle<git_commit>>() && isValueType<OwnedHandle<git_config>>() &&
+              isValueType<OwnedHandle<git_index>>() &&
+              isValueType<OwnedHandle<git_index_conflict_iterator>>() &&
+              isValueType<OwnedHandle<git_object>>() && isValueType<OwnedHandle<git_odb>>() &&
+              isValueType<OwnedHandle<git_odb_object>>() &&
+              isValueType<OwnedHandle<git_reference>>() && isValueType<OwnedHandle<git_remote>>() &&
+              isValueType<OwnedHandle<git_repository>>() &&
+              isValueType<OwnedHandle<git_signature>>() && isValueType<OwnedHandle<git_tree>>());
+static_assert(std::is_empty_v<GitErrorPolicy>);
+
+const std::string valueHook =
+    "static constexpr void vclink::git::GitErrorPolicy::wide_value_check(Impl&&)";
+const std::string errorHook =
+    "static constexpr void vclink::git::GitErrorPolicy::wide_error_check(Impl&&)";
+
+/// Expects that `action` raises a bad_result_access with this text and source position.
+template <class Action>
+void expectBadAccess(Action action, const std::string &text, const std::string &function, int line)
+{
+    try
+    {
+        action();
+        ADD_FAILURE() << "nothing was raised";
+    }
+    catch (const boost::outcome_v2::bad_result_access &access)
+    {
+        EXPECT_EQ(access.what(), text);
+        const auto *const thrownFrom = boost::get_error_info<boost::throw_function>(access);
+        const auto *const thrownIn = boost::get_error_info<boost::throw_file>(access);
+        const auto *const thrownAt = boost::get_error_info<boost::throw_line>(access);
+        ASSERT_TRUE(thrownFrom != nullptr && thrownIn != nullptr && thrownAt != nullptr);
+        EXPECT_EQ(*thrownFrom, function);
+        EXPECT_STREQ(*thrownIn, "error/errorUtil");
+        EXPECT_EQ(*thrownAt, line);
+    }
+}
+
+TEST(GitResult, GivesTheValueItHoldsAndWritesNothing)
+{
+    const LogCapture log;
+    const GitResult<const char *> result("value");
+    EXPECT_STREQ(result.value(), "value");
+    EXPECT_THAT(log.messages(), IsEmpty());
+}
+
+TEST(GitResult, OfASuccessHoldsADefaultMadeError)
+{
+    const HermeticLibGit2 libgit2;
+    git_error_set_str(GIT_ERROR_NET, "stale");
+    const GitResult<void> result = makeResult(0);
+    ASSERT_TRUE(result.has_value());
+    EXPECT_EQ(Peek::error(result).getCode(), 0);
+    EXPECT_EQ(Peek::error(result).getErrorClass(), 0);
+    EXPECT_EQ(Peek::error(result).getMessage(), ustring());
+}
+
+TEST(GitResult, OfAFailureRaisesItWhenAskedForItsValue)
+{
+    const HermeticLibGit2 libgit2;
+    git_error_set_str(GIT_ERROR_INDEX, "locked");
+    const GitResult<void> result = makeResult(GIT_ELOCKED);
+    git_error_clear();
+    try
+    {
+        result.value();
+        ADD_FAILURE() << "nothing was raised";
+    }
+    catch (const LibGit2Exception &exception)
+    {
+        EXPECT_EQ(exception.getError().getCode(), GIT_ELOCKED);
+        EXPECT_EQ(exception.getError().getErrorClass(), GIT_ERROR_INDEX);
+        EXPECT_EQ(exception.getError().getMessage(), u"locked");
+    }
+}
+
+TEST(GitResult, RaisesNothingBeforeItIsAsked)
+{
+    const LogCapture log;
+    const GitResult<void> result = makeResult(GIT_ERROR);
+    EXPECT_TRUE(result.has_error());
+    EXPECT_FALSE(result.has_value());
+    EXPECT_THAT(log.messages(), IsEmpty());
+}
+
+TEST(GitResult, GoesThroughThePolicyAlsoWithAnErrorOfCodeZero)
+{
+    const LogCapture log(SeverityDiagnostic);
+    const GitResult<void> result = GitError();
+    EXPECT_NO_THROW(result.value());
+    EXPECT_THAT(log.messages(), ElementsAre("Throwing error  (0)"));
+}
+
+TEST(GitResult, TellsThatThereIsNoValueWhenItHoldsNothing)
+{
+    const LogCapture log;
+    const GitResult<void> result = Peek::emptied(makeResult(0));
+    expectBadAccess([&result] { result.value(); }, "no value", valueHook, 52);
+    EXPECT_THAT(log.messages(), IsEmpty());
+}
+
+TEST(GitResult, GivesTheErrorItHoldsAndWritesNothing)
+{
+    const HermeticLibGit2 libgit2;
+    const LogCapture log;
+    const GitResult<void> result = makeResult(GIT_ITEROVER);
+    EXPECT_EQ(result.error().getCode(), GIT_ITEROVER);
+    EXPECT_THAT(log.messages(), IsEmpty());
+}
+
+TEST(GitResult, TellsThatThereIsNoErrorWhenItHoldsAValue)
+{
+    const LogCapture log;
+    const GitResult<const char *> result("value");
+    expectBadAccess([&result] { static_cast<void>(result.error()); }, "no error", errorHook, 60);
+    EXPECT_THAT(log.messages(), IsEmpty());
+}
+
+TEST(GitResult, TellsThatThereIsNoErrorWhenItHoldsNothing)
+{
+    const GitResult<void> result = Peek::emptied(makeResult(0));
+    expectBadAccess([&result] { static_cast<void>(result.error()); }, "no error", errorHook, 60);
+}
+
+TEST(GitErrorPolicy, HasHooksThatReturnForWhatTheResultHolds)
+{
+    const HermeticLibGit2 libgit2;
+    const GitResult<const char *> value("value");
+    const GitResult<void> failure = makeResult(GIT_ITEROVER);
+    EXPECT_NO_THROW(GitErrorPolicy::wide_value_check(value));
+    EXPECT_NO_THROW(GitErrorPolicy::wide_error_check(failure));
+    EXPECT_THROW(GitErrorPolicy::wide_value_check(failure), LibGit2Exception);
+    EXPECT_THROW(GitErrorPolicy::wide_error_check(value), boost::outcome_v2::bad_result_access);
+}
+
+} // namespace
+} // namespace vclink::git

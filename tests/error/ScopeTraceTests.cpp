@@ -1,0 +1,176 @@
+// SPDX-License-Identifier: MIT
+#include "error/logging/ScopeTrace.hpp"
+
+#include <stdexcept>
+#include <string>
+#include <type_traits>
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include "support/LogCapture.hpp"
+
+namespace vclink::git
+{
+namespace
+{
+
+using test::LogCapture;
+using test::LogRecord;
+using testing::ElementsAre;
+using testing::IsEmpty;
+
+static_assert(!std::is_copy_constructible_v<ScopeTrace> && !std::is_copy_assignable_v<ScopeTrace>);
+
+constexpr const char *signature = "void traced(int)";
+
+auto isRecord(unsigned severity, const std::string &message)
+{
+    return testing::AllOf(testing::Field(&LogRecord::severity, severity),
+                          testing::Field(&LogRecord::message, message));
+}
+
+void enable(unsigned severities)
+{
+    logger().set_enabled_severities(severities);
+}
+
+TEST(ScopeTrace, WritesItsSignatureAtEntryAndAtExit)
+{
+    const LogCapture log;
+    {
+        const ScopeTrace trace(logger(), signature, "folder/file", 12);
+        EXPECT_THAT(log.records(), ElementsAre(isRecord(0x20, signature)));
+    }
+    EXPECT_THAT(log.records(), ElementsAre(isRecord(0x20, signature), isRecord(0x40, signature)));
+}
+
+TEST(ScopeTrace, HoldsPathAndLine)
+{
+    const ScopeTrace trace(logger(), signature, "folder/file", 12);
+    EXPECT_STREQ(trace.getPath(), "folder/file");
+    EXPECT_EQ(trace.getLine(), 12u);
+}
+
+TEST(ScopeTrace, CountsTheScopesThatAreOpen)
+{
+    const LogCapture log;
+    EXPECT_EQ(logger().scope_depth(), 0);
+    {
+        const ScopeTrace outer(logger(), "outer", "file", 1);
+        EXPECT_EQ(logger().scope_depth(), 1);
+        {
+            const ScopeTrace inner(logger(), "inner", "file", 2);
+            EXPECT_EQ(logger().scope_depth(), 2);
+        }
+        EXPECT_EQ(logger().scope_depth(), 1);
+    }
+    EXPECT_EQ(logger().scope_depth(), 0);
+    EXPECT_THAT(log.messages(), ElementsAre("outer", "inner", "inner", "outer"));
+}
+
+TEST(ScopeTrace, TellsThatAnExceptionPasses)
+{
+    const LogCapture log;
+    try
+    {
+        const ScopeTrace trace(logger(), signature, "file", 1);
+        throw std::runtime_error("passing");
+    }
+    catch (const std::runtime_error &)
+    {
+        EXPECT_EQ(logger().scope_depth(), 0);
+    }
+    EXPECT_THAT(log.messages(SeverityScopeExit), ElementsAre(std::string(signature) + " [throw]"));
+}
+
+TEST(ScopeTrace, TellsNoExceptionInsideAHandler)
+{
+    const LogCapture log;
+    try
+    {
+        throw std::runtime_error("caught");
+    }
+    catch (const std::runtime_error &)
+    {
+        const ScopeTrace trace(logger(), signature, "file", 1);
+    }
+    EXPECT_THAT(log.messages(SeverityScopeExit), ElementsAre(signature));
+}
+
+/// Opens a scope when it is destroyed.
+struct TracesItsEnd
+{
+    ~TracesItsEnd()
+    {
+        const ScopeTrace trace(logger(), signature, "file", 1);
+    }
+};
+
+TEST(ScopeTrace, TellsAnExceptionThatPassesElsewhereOnTheThread)
+{
+    const LogCapture log;
+    try
+    {
+        const TracesItsEnd tracesItsEnd;
+        throw std::runtime_error("passing");
+    }
+    catch (const std::runtime_error &)
+    {
+        EXPECT_THAT(log.messages(SeverityScopeExit),
+                    ElementsAre(std::string(signature) + " [throw]"));
+    }
+}
+
+TEST(ScopeTrace, DoesNothingWhenItsEntryIsDisabled)
+{
+    const LogCapture log(~static_cast<unsigned>(SeverityScopeEntry));
+    {
+        const ScopeTrace trace(logger(), signature, "file", 1);
+        EXPECT_EQ(logger().scope_depth(), 0);
+        enable(LogCapture::allSeverities);
+    }
+    EXPECT_EQ(logger().scope_depth(), 0);
+    EXPECT_THAT(log.records(), IsEmpty());
+}
+
+TEST(ScopeTrace, StillEndsWhenItsEntryIsDisabledMeanwhile)
+{
+    const LogCapture log;
+    {
+        const ScopeTrace trace(logger(), signature, "file", 1);
+        EXPECT_EQ(logger().scope_depth(), 1);
+        enable(SeverityScopeExit);
+    }
+    EXPECT_EQ(logger().scope_depth(), 0);
+    EXPECT_THAT(log.records(), ElementsAre(isRecord(0x20, signature), isRecord(0x40, signature)));
+}
+
+TEST(ScopeTrace, CountsWithoutARecordWhenOnlyItsExitIsDisabled)
+{
+    const LogCapture log(SeverityScopeEntry);
+    {
+        const ScopeTrace trace(logger(), signature, "file", 1);
+        EXPECT_EQ(logger().scope_depth(), 1);
+    }
+    EXPECT_EQ(logger().scope_depth(), 0);
+    EXPECT_THAT(log.records(), ElementsAre(isRecord(0x20, signature)));
+}
+
+TEST(ScopeTrace, TracesTheLoggerThatItIsGiven)
+{
+    Logger other("another logger");
+    const LogCapture log(LogCapture::allSeverities, "another logger");
+    const LogCapture own;
+    {
+        const ScopeTrace trace(other, signature, "file", 1);
+        EXPECT_EQ(other.scope_depth(), 1);
+        EXPECT_EQ(logger().scope_depth(), 0);
+    }
+    EXPECT_EQ(other.scope_depth(), 0);
+    EXPECT_THAT(log.messages(), ElementsAre(signature, signature));
+    EXPECT_THAT(own.messages(), IsEmpty());
+}
+
+} // namespace
+} // namespace vclink::git

@@ -1,0 +1,242 @@
+// SPDX-License-Identifier: MIT
+#include <memory>
+#include <string>
+#include <type_traits>
+#include <utility>
+
+#include <git2.h>
+#include <gtest/gtest.h>
+
+#include "AdapterTest.hpp"
+#include "support/Descriptors.hpp"
+#include "support/text.hpp"
+#include "vclink/git/LibGit2Exception.hpp"
+
+namespace
+{
+
+using vclink::ApplicationInteractor;
+using vclink::git::GitAdapter;
+using vclink::git::GitOptionsFactory;
+using vclink::git::LibGit2Exception;
+using vclink::test::asPath;
+using vclink::test::asUtf8;
+
+int countStarts()
+{
+    const int count = git_libgit2_init() - 1;
+    git_libgit2_shutdown();
+    return count;
+}
+
+/// What stood when a factory was destroyed.
+struct Testimony
+{
+    int starts = -1;
+    long interactorShares = -1;
+};
+
+/// A host's own factory, which looks around when it goes.
+class WatchingFactory : public GitOptionsFactory
+{
+  public:
+    WatchingFactory(std::shared_ptr<ApplicationInteractor> interactor, Testimony &testimony)
+        : GitOptionsFactory(std::move(interactor)), testimony_(testimony)
+    {
+    }
+    ~WatchingFactory() override
+    {
+        testimony_.starts = countStarts();
+        testimony_.interactorShares = getInteractor().use_count() - 1;
+    }
+    vclink::git::CloneOptions makeCloneOptions() override
+    {
+        return {};
+    }
+    vclink::git::FetchOptions makeFetchOptions() override
+    {
+        return {};
+    }
+    vclink::git::ProxyOptions makeProxyOptions() override
+    {
+        return {};
+    }
+    vclink::git::PushOptions makePushOptions() override
+    {
+        return {};
+    }
+    vclink::git::CheckoutOptions makeCheckoutOptions() override
+    {
+        return {};
+    }
+    vclink::git::StatusOptions makeStatusOptions() override
+    {
+        ++statusOptionsMade;
+        sharesWhileMaking = shares.use_count();
+        return {};
+    }
+    vclink::git::MergeOptions makeMergeOptions() override
+    {
+        return {};
+    }
+
+    int statusOptionsMade = 0;
+    std::weak_ptr<GitOptionsFactory> shares;
+    long sharesWhileMaking = 0;
+
+  private:
+    Testimony &testimony_;
+};
+
+class GitAdapterTest : public vclink::test::AdapterTest
+{
+};
+
+TEST_F(GitAdapterTest, GivesBackTheVeryRootItWasGiven)
+{
+    for (const std::u16string text : {u"", u"relative/./x", u"/a/../b//", u"/\u00FC\xD800", u"/"})
+    {
+        for (const bool native : {true, false})
+        {
+            GitAdapter adapter(upath(text, native),
+                               std::static_pointer_cast<ApplicationInteractor>(interactor_));
+            EXPECT_EQ(adapter.getRootFolder().string(), text);
+            EXPECT_EQ(adapter.getRootFolder().native(), native);
+        }
+    }
+}
+
+TEST_F(GitAdapterTest, GivesItsOwnRootAndNoOther)
+{
+    const upath given = asPath(folder().path());
+    GitAdapter adapter(given, std::static_pointer_cast<ApplicationInteractor>(interactor_));
+    EXPECT_NE(&adapter.getRootFolder(), &given);
+    EXPECT_EQ(&adapter.getRootFolder(), &adapter.getRootFolder());
+}
+
+TEST_F(GitAdapterTest, GivesTheRootAfterAnyOperation)
+{
+    auto repository = makeRepository();
+    repository.write("file", "x");
+    repository.symlink("repository", "../link");
+    const std::string given = (folder() / "link/../link/./").string();
+    const auto adapter = makeAdapter(given);
+    const upath root = adapter->getRootFolder();
+    adapter->getFileStates({asPath(given + "file")});
+    adapter->getFileStates({});
+    adapter->getFolderStates(root);
+    EXPECT_THROW(adapter->commit(root, u"message"), LibGit2Exception);
+    EXPECT_THROW(adapter->addFiles({root}), LibGit2Exception);
+    EXPECT_EQ(asUtf8(adapter->getRootFolder().string()), given);
+}
+
+TEST_F(GitAdapterTest, OpensARepositoryOfItsOwnForEachCaller)
+{
+    const auto repository = makeRepository();
+    const auto adapter = makeAdapter(repository.path());
+    auto first = adapter->getRepository();
+    const auto second = adapter->getRepository();
+    ASSERT_NE(first, nullptr);
+    EXPECT_NE(first.get(), second.get());
+    first.reset();
+    EXPECT_EQ(git_repository_workdir(second.get()), repository.path().string() + '/');
+}
+
+TEST_F(GitAdapterTest, RaisesWhereItsRepositoryCannotBeOpened)
+{
+    const auto adapter = makeAdapter(folder() / "missing");
+    const vclink::test::NoDescriptorLeak noLeak;
+    try
+    {
+        adapter->getRepository();
+        FAIL() << "no exception";
+    }
+    catch (const LibGit2Exception &exception)
+    {
+        EXPECT_EQ(exception.getError().getCode(), GIT_ENOTFOUND);
+    }
+}
+
+TEST_F(GitAdapterTest, SharesTheFactoryAndTheInteractor)
+{
+    Testimony testimony;
+    const auto factory = std::make_shared<WatchingFactory>(interactor_, testimony);
+    const GitAdapter adapter(asPath(folder().path()), factory);
+    EXPECT_EQ(factory.use_count(), 2);
+    const auto share = adapter.getOptionsFactory();
+    EXPECT_EQ(share, factory);
+    EXPECT_EQ(factory.use_count(), 3);
+    EXPECT_EQ(adapter.getInteractor(), interactor_);
+    EXPECT_EQ(adapter.getInteractor(), factory->getInteractor());
+    // This test, the factory, the callbacks and the adapter.
+    EXPECT_EQ(interactor_.use_count(), 4);
+}
+
+TEST_F(GitAdapterTest, MakesADefaultFactoryForAnInteractor)
+{
+    const auto adapter = makeAdapter(folder().path());
+    EXPECT_EQ(adapter->getOptionsFactory()->getInteractor(), interactor_);
+    EXPECT_EQ(adapter->getInteractor(), interactor_);
+    // The adapter's own share, and the one asked for here.
+    EXPECT_EQ(adapter->getOptionsFactory().use_count(), 2);
+}
+
+TEST_F(GitAdapterTest, OwnsOneObjectOfCallbacks)
+{
+    const auto one = makeAdapter(folder().path());
+    const auto other = makeAdapter(folder().path());
+    EXPECT_EQ(&one->getCallbacks(), &one->getCallbacks());
+    EXPECT_NE(&one->getCallbacks(), &other->getCallbacks());
+    EXPECT_EQ(&one->getCallbacks().checkoutCallbacks(), &one->getCallbacks().checkoutCallbacks());
+}
+
+TEST_F(GitAdapterTest, AsksTheFactoryForTheOptionsOfEachWalk)
+{
+    const auto repository = makeRepository();
+    Testimony testimony;
+    const auto factory = std::make_shared<WatchingFactory>(interactor_, testimony);
+    factory->shares = factory;
+    GitAdapter adapter(asPath(repository.path()), factory);
+    adapter.getFileStates({});
+    EXPECT_EQ(factory->statusOptionsMade, 0);
+    adapter.getFileStates({asPath(repository / "file")});
+    EXPECT_EQ(factory->statusOptionsMade, 1);
+    // Besides the test's and the adapter's, the walk holds a share.
+    EXPECT_EQ(factory->sharesWhileMaking, 3);
+    adapter.getFolderStates(adapter.getRootFolder());
+    EXPECT_EQ(factory->statusOptionsMade, 2);
+    EXPECT_EQ(factory.use_count(), 2);
+}
+
+/// The factory goes when the interactor and the callbacks have gone, and before the guard.
+TEST_F(GitAdapterTest, EndsTheGuardLast)
+{
+    const int before = countStarts();
+    Testimony testimony;
+    std::shared_ptr<ApplicationInteractor> interactor =
+        std::make_shared<vclink::test::TestInteractor>();
+    auto adapter = std::make_unique<GitAdapter>(
+        asPath(folder().path()),
+        std::make_shared<WatchingFactory>(std::move(interactor), testimony));
+    adapter.reset();
+    EXPECT_EQ(testimony.starts, before + 1);
+    EXPECT_EQ(testimony.interactorShares, 1);
+    EXPECT_EQ(countStarts(), before);
+}
+
+TEST_F(GitAdapterTest, CannotBeCopied)
+{
+    EXPECT_FALSE(std::is_copy_constructible_v<GitAdapter>);
+    EXPECT_FALSE(std::is_copy_assignable_v<GitAdapter>);
+}
+
+TEST_F(GitAdapterTest, TakesSeveralShortLivesWithoutLeavingADescriptor)
+{
+    const auto repository = makeRepository();
+    makeAdapter(repository.path())->getFolderStates(asPath(repository.path()));
+    const vclink::test::NoDescriptorLeak noLeak;
+    for (int i = 0; i < 20; ++i)
+        makeAdapter(repository.path())->getFolderStates(asPath(repository.path()));
+}
+
+} // namespace

@@ -1,0 +1,180 @@
+// SPDX-License-Identifier: MIT
+#include <filesystem>
+#include <string>
+
+#include <git2.h>
+#include <gtest/gtest.h>
+
+#include "support/Descriptors.hpp"
+#include "support/GitTest.hpp"
+#include "support/LibGit2Session.hpp"
+#include "support/UnprivilegedUser.hpp"
+#include "support/text.hpp"
+#include "vclink/git/GitAdapterFactory.hpp"
+#include "vclink/git/LibGit2Exception.hpp"
+
+namespace
+{
+
+using vclink::git::GitAdapterFactory;
+using vclink::git::LibGit2Exception;
+using vclink::test::asPath;
+
+/// "true", "false", or the code of the exception.
+std::string probe(const std::string &path)
+{
+    try
+    {
+        return GitAdapterFactory().isAdapterFor(asPath(path)) ? "true" : "false";
+    }
+    catch (const LibGit2Exception &exception)
+    {
+        return std::to_string(exception.getError().getCode());
+    }
+}
+
+/// The same, asked of libgit2 itself.
+std::string probeDirectly(const std::string &path)
+{
+    const int code =
+        git_repository_open_ext(nullptr, path.c_str(), GIT_REPOSITORY_OPEN_NO_SEARCH, nullptr);
+    return code == 0 ? "true" : code == GIT_ENOTFOUND ? "false" : std::to_string(code);
+}
+
+class IsAdapterFor : public vclink::test::GitTest
+{
+  protected:
+    void expectProbe(const std::filesystem::path &path, const std::string &expected) const
+    {
+        EXPECT_EQ(probe(path), expected) << path;
+        EXPECT_EQ(probeDirectly(path), expected) << path;
+    }
+
+    vclink::test::LibGit2Session session_{environment()};
+    vclink::test::GitRepository repository_ = makeRepository();
+};
+
+TEST_F(IsAdapterFor, IsTrueForTheRootOfAWorkingCopy)
+{
+    expectProbe(repository_.path(), "true");
+    expectProbe(repository_ / "", "true");
+    expectProbe(repository_ / ".", "true");
+    expectProbe(repository_ / ".git", "true");
+}
+
+TEST_F(IsAdapterFor, IsTrueForABareRepository)
+{
+    repository_.git({"init", "--quiet", "--bare", (folder() / "bare").string()});
+    expectProbe(folder() / "bare", "true");
+}
+
+TEST_F(IsAdapterFor, IsTrueForALinkedWorktree)
+{
+    repository_.commit("first");
+    repository_.git({"worktree", "add", "--quiet", (folder() / "linked").string()});
+    ASSERT_TRUE(std::filesystem::is_regular_file(folder() / "linked/.git"));
+    expectProbe(folder() / "linked", "true");
+}
+
+TEST_F(IsAdapterFor, IsTrueForASubmodule)
+{
+    auto inner = makeRepository("inner");
+    inner.commit("first");
+    repository_.git({"submodule", "--quiet", "add", inner.path().string(), "module"});
+    expectProbe(repository_ / "module", "true");
+}
+
+TEST_F(IsAdapterFor, IsTrueForARootReachedThroughALink)
+{
+    repository_.symlink(repository_.path().string(), "../link");
+    expectProbe(folder() / "link", "true");
+}
+
+TEST_F(IsAdapterFor, IsFalseForASubfolder)
+{
+    repository_.makeFolder("sub/dir");
+    expectProbe(repository_ / "sub", "false");
+    expectProbe(repository_ / "sub/dir", "false");
+}
+
+TEST_F(IsAdapterFor, IsFalseForWhatIsMissingOrNoFolder)
+{
+    repository_.write("file", "x");
+    expectProbe(folder() / "missing", "false");
+    expectProbe(repository_ / "file", "false");
+    expectProbe(repository_ / "file/x", "false");
+    expectProbe("", "false");
+}
+
+TEST_F(IsAdapterFor, IsFalseForAFolderWithoutARepository)
+{
+    expectProbe(environment().home(), "false");
+    repository_.makeFolder("empty/.git");
+    expectProbe(repository_ / "empty", "false");
+}
+
+TEST_F(IsAdapterFor, IsFalseForARepositoryWithoutItsParts)
+{
+    for (const auto *part : {"HEAD", "objects", "refs"})
+    {
+        const auto broken = makeRepository(std::string("without-") + part);
+        broken.remove(std::string(".git/") + part);
+        expectProbe(broken.path(), "false");
+    }
+}
+
+TEST_F(IsAdapterFor, IsTrueWhereOnlyAnOperationMeetsTheDamage)
+{
+    repository_.write(".git/HEAD", "no reference\n");
+    expectProbe(repository_.path(), "true");
+    const auto configuration = makeRepository("configuration");
+    configuration.write(".git/config", "[core\n");
+    expectProbe(configuration.path(), "true");
+}
+
+TEST_F(IsAdapterFor, RaisesForAGitFileThatCannotBeRead)
+{
+    repository_.write("garbage/.git", "neither a folder nor a link");
+    expectProbe(repository_ / "garbage", std::to_string(GIT_ERROR));
+    repository_.write("empty/.git", "");
+    expectProbe(repository_ / "empty", std::to_string(GIT_ERROR));
+    repository_.write("nowhere/.git", "gitdir: nowhere\n");
+    expectProbe(repository_ / "nowhere", "false");
+}
+
+TEST_F(IsAdapterFor, RaisesForANameThatTheSystemRefuses)
+{
+    expectProbe(folder() / std::string(300, 'n'), std::to_string(GIT_ERROR));
+}
+
+TEST_F(IsAdapterFor, RaisesWhereTheFolderCannotBeReached)
+{
+    vclink::test::giveToUnprivilegedUser(repository_.path());
+    const std::string inside = repository_ / "locked/inside";
+    std::filesystem::create_directories(inside);
+    repository_.setMode("locked", 0000);
+    EXPECT_EQ(vclink::test::runAsUnprivilegedUser(
+                  [&] { return probe(repository_.path()) + " " + probe(inside); }),
+              "true " + std::to_string(GIT_ERROR));
+}
+
+/// libgit2 tells such a folder not from one without a repository.
+TEST_F(IsAdapterFor, AnswersAsLibGit2DoesForAFolderThatCannotBeLookedInto)
+{
+    vclink::test::giveToUnprivilegedUser(repository_.path());
+    std::filesystem::permissions(repository_.path(), std::filesystem::perms(0000));
+    EXPECT_EQ(vclink::test::runAsUnprivilegedUser(
+                  [&] { return probe(repository_.path()) + probeDirectly(repository_.path()); }),
+              "falsefalse");
+}
+
+TEST_F(IsAdapterFor, LeavesNoDescriptorOpen)
+{
+    repository_.write("broken/.git", "neither a folder nor a link");
+    probe(repository_.path());
+    const vclink::test::NoDescriptorLeak noLeak;
+    for (const auto *name : {"", "missing", "broken"})
+        EXPECT_NE(probe(repository_ / name), "");
+}
+
+} // namespace

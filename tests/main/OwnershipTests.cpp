@@ -1,0 +1,112 @@
+// SPDX-License-Identifier: MIT
+#include <filesystem>
+#include <string>
+
+#include <git2.h>
+#include <gtest/gtest.h>
+
+#include "AdapterTest.hpp"
+#include "support/UnprivilegedUser.hpp"
+#include "support/text.hpp"
+#include "vclink/git/GitAdapterFactory.hpp"
+#include "vclink/git/LibGit2Exception.hpp"
+
+namespace
+{
+
+using vclink::git::LibGit2Exception;
+using vclink::test::asPath;
+
+/// A repository of whoever runs the tests, met by the unprivileged user, who is another one where
+/// the tests run as root.
+class Ownership : public vclink::test::AdapterTest
+{
+  protected:
+    Ownership()
+    {
+        repository_.write("file", "x");
+        for (const auto &entered : {repository_.path(), environment().home()})
+            std::filesystem::permissions(entered, std::filesystem::perms(0755));
+    }
+
+    void trust(const std::string &folders) const
+    {
+        vclink::test::GitRepository(environment().home())
+            .write(".gitconfig", "[safe]\n\tdirectory = " + folders + "\n");
+    }
+
+    /// What the first operation comes to: "code class text", or the number of states.
+    std::string openedByTheOther() const
+    {
+        return vclink::test::runAsUnprivilegedUser(
+            [this]() -> std::string
+            {
+                const upath root = asPath(repository_.path());
+                try
+                {
+                    const auto states = makeAdapter(repository_.path())->getFolderStates(root);
+                    return std::to_string(states.size()) + " states";
+                }
+                catch (const LibGit2Exception &exception)
+                {
+                    const auto &error = exception.getError();
+                    return std::to_string(error.getCode()) + ' ' +
+                           std::to_string(error.getErrorClass()) + ' ' +
+                           vclink::test::asUtf8(error.getMessage());
+                }
+            });
+    }
+    static std::string unlessOwn(const std::string &refused)
+    {
+        return vclink::test::runsAsRoot() ? refused : "1 states";
+    }
+
+    vclink::test::GitRepository repository_ = makeRepository();
+};
+
+TEST_F(Ownership, OfAnotherUserRefusesTheFirstOperation)
+{
+    EXPECT_EQ(openedByTheOther(), unlessOwn("-3 7 config value 'safe.directory' was not found"));
+}
+
+TEST_F(Ownership, OfAnotherUserIsNamedWhereOtherFoldersAreTrusted)
+{
+    trust("/another/folder");
+    EXPECT_EQ(openedByTheOther(),
+              unlessOwn("-36 7 repository path '" + repository_.path().string() +
+                        "/' is not owned by current user"));
+}
+
+TEST_F(Ownership, OfAnotherUserDoesNotMatterForATrustedFolder)
+{
+    trust(repository_.path());
+    EXPECT_EQ(openedByTheOther(), "1 states");
+}
+
+/// git takes a star for every folder, libgit2 does not.
+TEST_F(Ownership, OfAnotherUserIsNotTrustedByAStar)
+{
+    trust("*");
+    EXPECT_EQ(openedByTheOther().substr(0, 5), unlessOwn("-36 7").substr(0, 5));
+}
+
+/// A probe looks at the layout only.
+TEST_F(Ownership, OfAnotherUserIsNotSeenByAProbe)
+{
+    const auto probe = [this]() -> std::string
+    {
+        const upath root = asPath(repository_.path());
+        return vclink::git::GitAdapterFactory().isAdapterFor(root) ? "true" : "false";
+    };
+    EXPECT_EQ(vclink::test::runAsUnprivilegedUser(probe), "true");
+    trust("/another/folder");
+    EXPECT_EQ(vclink::test::runAsUnprivilegedUser(probe), "true");
+}
+
+TEST_F(Ownership, IsFineForTheOneWhoOwnsTheRepository)
+{
+    vclink::test::giveToUnprivilegedUser(repository_.path());
+    EXPECT_EQ(openedByTheOther(), "1 states");
+}
+
+} // namespace

@@ -1,0 +1,376 @@
+// SPDX-License-Identifier: MIT
+#include "options/Callbacks.hpp"
+
+#include <climits>
+#include <cstddef>
+#include <exception>
+#include <functional>
+#include <stdexcept>
+#include <string>
+#include <tuple>
+#include <type_traits>
+#include <utility>
+#include <vector>
+
+#include <boost/exception/diagnostic_information.hpp>
+#include <boost/exception/exception.hpp>
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include "error/CoreFilter.hpp"
+#include "support/LogCapture.hpp"
+#include "vclink/util/exception/CancelledOperationException.hpp"
+
+namespace vclink::git
+{
+namespace
+{
+
+using test::CoreFilter;
+using test::LogCapture;
+using test::LogRecord;
+using testing::ElementsAre;
+using testing::HasSubstr;
+using testing::IsEmpty;
+using testing::StartsWith;
+using vclink::util::exception::CancelledOperationException;
+
+/// What is called through the bridge, and does what a test tells it.
+class Target
+{
+  public:
+    int answer(const char *text, unsigned number)
+    {
+        received.emplace_back(text, number);
+        return body();
+    }
+    void notice(const char *text, std::size_t number)
+    {
+        received.emplace_back(text, static_cast<unsigned>(number));
+        body();
+    }
+    int otherAnswer(unsigned)
+    {
+        return body();
+    }
+
+    std::function<int()> body = [] { return 0; };
+    std::vector<std::pair<std::string, unsigned>> received;
+};
+
+using AnswerCallback = int (*)(const char *, unsigned, void *);
+using NoticeCallback = void (*)(const char *, std::size_t, void *);
+
+constexpr AnswerCallback answer = makeCallback<&Target::answer, AnswerCallback>();
+constexpr NoticeCallback notice = makeCallback<&Target::notice, NoticeCallback>();
+
+using AnswerLambda = decltype(detail::makeCallbackImpl<&Target::answer>(
+    std::tuple<const char *, unsigned, void *>()));
+using NoticeLambda = decltype(detail::makeCallbackImpl<&Target::notice>(
+    std::tuple<const char *, std::size_t, void *>()));
+static_assert(std::is_empty_v<AnswerLambda> && std::is_empty_v<NoticeLambda>, "no state");
+static_assert(std::is_convertible_v<AnswerLambda, AnswerCallback> &&
+              std::is_convertible_v<NoticeLambda, NoticeCallback>);
+static_assert(std::is_nothrow_invocable_r_v<int, AnswerLambda, const char *, unsigned, void *>);
+static_assert(std::is_nothrow_invocable_v<NoticeLambda, const char *, std::size_t, void *>);
+static_assert(
+    std::is_void_v<std::invoke_result_t<NoticeLambda, const char *, std::size_t, void *>>);
+
+struct BoostOnly : virtual boost::exception
+{
+};
+
+auto isRecord(unsigned severity, const std::string &message)
+{
+    return testing::AllOf(testing::Field(&LogRecord::severity, severity),
+                          testing::Field(&LogRecord::message, message));
+}
+
+class Callback : public testing::Test
+{
+  protected:
+    Callback()
+    {
+        pendingCallbackException() = nullptr;
+    }
+    ~Callback() override
+    {
+        pendingCallbackException() = nullptr;
+    }
+
+    /// Lets the target throw, and gives what the callback answers.
+    template <class Exception> int answerThrowing(const Exception &exception)
+    {
+        target.body = [&exception]() -> int { throw exception; };
+        return answer("path", 1, &target);
+    }
+
+    Target target;
+};
+
+TEST_F(Callback, CallsTheMemberWithItsArgumentsInOrder)
+{
+    answer("folder/file", 17, &target);
+    notice("other", 99, &target);
+    EXPECT_THAT(target.received,
+                ElementsAre(std::make_pair("folder/file", 17u), std::make_pair("other", 99u)));
+}
+
+TEST_F(Callback, GivesTheMembersResultUnchanged)
+{
+    for (const int result : {0, 1, -1, -7, -30, 42, INT_MIN, INT_MAX})
+    {
+        target.body = [result] { return result; };
+        EXPECT_EQ(answer("path", 1, &target), result);
+        EXPECT_EQ(pendingCallbackException(), nullptr) << result;
+    }
+}
+
+TEST_F(Callback, IsTheSameThroughTheLambda)
+{
+    target.body = [] { return 5; };
+    const auto lambda =
+        detail::makeCallbackImpl<&Target::answer>(std::tuple<const char *, unsigned, void *>());
+    EXPECT_EQ(lambda("path", 1, &target), 5);
+}
+
+TEST_F(Callback, ParksAnExceptionOfAnyTypeAndAnswersWithTheUsersCode)
+{
+    EXPECT_EQ(answerThrowing(std::runtime_error("failed")), -7);
+    EXPECT_THROW(std::rethrow_exception(pendingCallbackException()), std::runtime_error);
+    EXPECT_EQ(answerThrowing(CancelledOperationException()), -7);
+    EXPECT_THROW(std::rethrow_exception(pendingCallbackException()), CancelledOperationException);
+    EXPECT_EQ(answerThrowing(BoostOnly()), -7);
+    EXPECT_THROW(std::rethrow_exception(pendingCallbackException()), BoostOnly);
+    EXPECT_EQ(answerThrowing(42), -7);
+    EXPECT_THROW(std::rethrow_exception(pendingCallbackException()), int);
+}
+
+TEST_F(Callback, ParksTheVeryObjectThatWasThrown)
+{
+    const std::exception_ptr thrown = std::make_exception_ptr(std::runtime_error("failed"));
+    target.body = [&thrown]() -> int { std::rethrow_exception(thrown); };
+    answer("path", 1, &target);
+    EXPECT_EQ(pendingCallbackException(), thrown);
+}
+
+TEST_F(Callback, ReplacesAnExceptionThatNobodyHasTaken)
+{
+    answerThrowing(1);
+    answerThrowing(2);
+    try
+    {
+        std::rethrow_exception(pendingCallbackException());
+    }
+    catch (int number)
+    {
+        EXPECT_EQ(number, 2);
+    }
+}
+
+TEST_F(Callback, KeepsAParkedExceptionThroughALaterSuccess)
+{
+    answerThrowing(1);
+    target.body = [] { return 0; };
+    EXPECT_EQ(answer("path", 1, &target), 0);
+    EXPECT_NE(pendingCallbackException(), nullptr);
+}
+
+TEST_F(Callback, WithoutAResultReportsAndStoresNothing)
+{
+    target.body = []() -> int { throw std::runtime_error("failed"); };
+    const LogCapture log(SeverityException | SeverityStackTrace);
+    notice("path", 1, &target);
+    EXPECT_EQ(pendingCallbackException(), nullptr);
+    const auto records = log.records();
+    ASSERT_EQ(records.size(), 2u);
+    EXPECT_EQ(records[0].severity, 0x10u);
+    EXPECT_THAT(records[0].message, HasSubstr("failed"));
+    EXPECT_EQ(records[1].severity, 0x200u);
+}
+
+TEST_F(Callback, WithoutAResultLeavesAParkedExceptionAlone)
+{
+    answerThrowing(1);
+    const std::exception_ptr parked = pendingCallbackException();
+    target.body = []() -> int { throw 2; };
+    notice("path", 1, &target);
+    EXPECT_EQ(pendingCallbackException(), parked);
+}
+
+/// Lets a callback throw, and expects Boost's text of the exception and then a stack.
+template <class Exception> void expectReports(const Exception &exception)
+{
+    std::string expected;
+    try
+    {
+        throw exception;
+    }
+    catch (...)
+    {
+        expected = "Exception caught: " + boost::current_exception_diagnostic_information(true);
+    }
+    Target target;
+    target.body = [&exception]() -> int { throw exception; };
+    const LogCapture log(SeverityException | SeverityStackTrace);
+    answer("path", 1, &target);
+    const auto records = log.records();
+    ASSERT_EQ(records.size(), 2u);
+    EXPECT_THAT(records[0], isRecord(0x10, expected));
+    EXPECT_EQ(records[1].severity, 0x200u);
+    EXPECT_THAT(records[1].message, StartsWith("0# "));
+}
+
+TEST_F(Callback, ReportsTheExceptionAndThenTheStack)
+{
+    expectReports(std::runtime_error("failed"));
+    expectReports(CancelledOperationException());
+    expectReports(BoostOnly());
+    expectReports(42);
+}
+
+TEST_F(Callback, ReportsAtTheEnabledSeveritiesOnly)
+{
+    for (const unsigned severity : {0x10u, 0x200u})
+    {
+        const LogCapture log(severity);
+        answerThrowing(std::runtime_error("failed"));
+        ASSERT_EQ(log.records().size(), 1u);
+        EXPECT_EQ(log.records()[0].severity, severity);
+    }
+    const LogCapture log(~(SeverityException | SeverityStackTrace | SeverityScopeEntry));
+    EXPECT_EQ(answerThrowing(std::runtime_error("failed")), -7);
+    EXPECT_THAT(log.records(), IsEmpty());
+    EXPECT_NE(pendingCallbackException(), nullptr);
+}
+
+/// The one text under which a callback traces its entry and its exit.
+template <class Call> std::string tracedAs(Call call)
+{
+    const LogCapture log(SeverityScopeEntry | SeverityScopeExit);
+    call();
+    const auto records = log.records();
+    EXPECT_EQ(records.size(), 2u);
+    EXPECT_EQ(records.front().severity, 0x20u);
+    EXPECT_EQ(records.back().severity, 0x40u);
+    EXPECT_EQ(records.front().message, records.back().message);
+    return records.front().message;
+}
+
+#ifdef __clang__
+// clang's text of a lambda tells the arguments' types only.
+constexpr const char *memberInSignature = "std::tuple<const char *, unsigned int, void *>";
+#else
+constexpr const char *memberInSignature = "Target::answer";
+#endif
+
+TEST_F(Callback, TracesUnderASignatureThatNamesTheMember)
+{
+    const std::string text = tracedAs([this] { answer("path", 1, &target); });
+    EXPECT_THAT(text, HasSubstr("vclink::git::detail::makeCallbackImpl"));
+    EXPECT_THAT(text, HasSubstr(memberInSignature));
+}
+
+TEST_F(Callback, TracesEachInstanceUnderItsOwnSignature)
+{
+    const auto other = makeCallback<&Target::otherAnswer, int (*)(unsigned, void *)>();
+    const std::string one = tracedAs([this] { answer("path", 1, &target); });
+    const std::string two = tracedAs([this] { notice("path", 1, &target); });
+    const std::string three = tracedAs([this, other] { other(1, &target); });
+    EXPECT_NE(one, two);
+    EXPECT_NE(one, three);
+    EXPECT_NE(two, three);
+}
+
+TEST_F(Callback, TracesTheSameWhenTheMemberThrows)
+{
+    const std::string returning = tracedAs([this] { answer("path", 1, &target); });
+    EXPECT_EQ(tracedAs([this] { answerThrowing(1); }), returning);
+    EXPECT_EQ(logger().scope_depth(), 0);
+}
+
+TEST_F(Callback, ReportsInsideItsScope)
+{
+    const LogCapture log(SeverityScopeEntry | SeverityScopeExit | SeverityException |
+                         SeverityStackTrace);
+    answerThrowing(std::runtime_error("failed"));
+    std::vector<unsigned> severities;
+    for (const auto &record : log.records())
+    {
+        severities.push_back(record.severity);
+    }
+    EXPECT_THAT(severities, ElementsAre(0x20u, 0x10u, 0x200u, 0x40u));
+}
+
+TEST_F(Callback, CallsTheMemberInsideItsScope)
+{
+    const LogCapture log(SeverityScopeEntry);
+    target.body = []
+    {
+        EXPECT_EQ(logger().scope_depth(), 1);
+        return 0;
+    };
+    answer("path", 1, &target);
+    EXPECT_EQ(logger().scope_depth(), 0);
+}
+
+/// A filter that lets records of one severity fail.
+CoreFilter failAt(unsigned severity)
+{
+    return CoreFilter(
+        [severity](unsigned asked)
+        {
+            if (asked == severity)
+            {
+                throw std::logic_error("the sink failed");
+            }
+            return true;
+        });
+}
+
+class CallbackDeathTest : public Callback
+{
+};
+
+TEST_F(CallbackDeathTest, EndsTheProcessWhenTheTraceOfItsEntryFails)
+{
+    const LogCapture log;
+    EXPECT_DEATH(
+        {
+            const CoreFilter filter = failAt(SeverityScopeEntry);
+            answer("path", 1, &target);
+        },
+        "terminate called.*logic_error");
+}
+
+TEST_F(CallbackDeathTest, EndsTheProcessWhenTheTraceOfItsExitFails)
+{
+    const LogCapture log;
+    EXPECT_DEATH(
+        {
+            const CoreFilter filter = failAt(SeverityScopeExit);
+            answer("path", 1, &target);
+        },
+        "terminate called.*logic_error");
+}
+
+TEST_F(CallbackDeathTest, EndsTheProcessWhenTheReportFails)
+{
+    const LogCapture log;
+    EXPECT_DEATH(
+        {
+            const CoreFilter filter = failAt(SeverityException);
+            answerThrowing(1);
+        },
+        "terminate called.*logic_error");
+    target.body = []() -> int { throw 1; };
+    EXPECT_DEATH(
+        {
+            const CoreFilter filter = failAt(SeverityStackTrace);
+            notice("path", 1, &target);
+        },
+        "terminate called.*logic_error");
+}
+
+} // namespace
+} // namespace vclink::git

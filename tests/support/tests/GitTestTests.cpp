@@ -1,0 +1,122 @@
+// SPDX-License-Identifier: MIT
+#include <filesystem>
+#include <stdexcept>
+#include <string>
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include "support/GitTest.hpp"
+
+namespace
+{
+
+namespace fs = std::filesystem;
+using testing::HasSubstr;
+using vclink::test::GitRepository;
+
+class GitRepositoryTest : public vclink::test::GitTest
+{
+};
+
+TEST_F(GitRepositoryTest, BeginsEmptyOnTheBranchMain)
+{
+    const auto repository = makeRepository();
+    EXPECT_EQ(repository.path(), folder() / "repository");
+    EXPECT_EQ(repository.line({"symbolic-ref", "HEAD"}), "refs/heads/main");
+    EXPECT_EQ(repository.git({"status", "--porcelain"}), "");
+}
+
+TEST_F(GitRepositoryTest, WritesFilesOfAnyNameAndContent)
+{
+    const auto repository = makeRepository();
+    const std::string bytes("a\0b\r\n\xff", 6);
+    repository.write("deep/down/\xff \"x\"\n", bytes);
+    EXPECT_EQ(repository.read("deep/down/\xff \"x\"\n"), bytes);
+    EXPECT_EQ(repository.git({"ls-files", "-z", "--others"}),
+              std::string("deep/down/\xff \"x\"\n") + '\0');
+}
+
+TEST_F(GitRepositoryTest, MakesRemovesLinksAndSetsModes)
+{
+    const auto repository = makeRepository();
+    repository.makeFolder("a/b");
+    repository.symlink("nowhere", "c/link");
+    repository.write("tool", "x");
+    repository.setMode("tool", 0755);
+    EXPECT_TRUE(fs::is_directory(repository / "a/b"));
+    EXPECT_EQ(fs::read_symlink(repository / "c/link"), "nowhere");
+    EXPECT_EQ(fs::status(repository / "tool").permissions(), fs::perms(0755));
+    repository.remove("a");
+    EXPECT_FALSE(fs::exists(repository / "a"));
+    EXPECT_THROW(repository.remove("a"), std::runtime_error);
+}
+
+TEST_F(GitRepositoryTest, StagesNamesAsTheyAreAndNotAsPatterns)
+{
+    const auto repository = makeRepository();
+    for (const auto *name : {"a1", "a[1]", "#x", "!y"})
+        repository.write(name, "x");
+    repository.add({"a[1]", "#x"});
+    EXPECT_EQ(repository.git({"ls-files"}), "#x\na[1]\n");
+    repository.add();
+    EXPECT_EQ(repository.git({"ls-files"}), "!y\n#x\na1\na[1]\n");
+}
+
+TEST_F(GitRepositoryTest, StagesTheRemovalOfAName)
+{
+    auto repository = makeRepository();
+    repository.write("file", "x");
+    repository.commitAll("first");
+    repository.remove("file");
+    repository.add({"file"});
+    EXPECT_EQ(repository.git({"status", "--porcelain"}), "D  file\n");
+}
+
+TEST_F(GitRepositoryTest, CommitsTheSameIdsEveryTime)
+{
+    auto one = makeRepository("one");
+    auto two = makeRepository("two");
+    for (auto *repository : {&one, &two})
+        repository->write("file", "text");
+    const auto id = one.commitAll("first");
+    EXPECT_EQ(id.size(), 40u);
+    EXPECT_EQ(two.commitAll("first"), id);
+    EXPECT_NE(one.commit("second"), id);
+}
+
+TEST_F(GitRepositoryTest, CommitsWithoutLeavingAnIdentity)
+{
+    auto repository = makeRepository();
+    repository.commit("first");
+    EXPECT_EQ(repository.line({"log", "--format=%an <%ae>"}), "Test Author <author@example.com>");
+    EXPECT_FALSE(repository.tryGit({"config", "user.name"}).succeeded());
+}
+
+TEST_F(GitRepositoryTest, ClonesAnother)
+{
+    auto source = makeRepository("source");
+    source.write("file", "text");
+    const auto id = source.commitAll("first");
+    const auto copy = GitRepository::clone(source.path(), folder() / "copy");
+    EXPECT_EQ(copy.read("file"), "text");
+    EXPECT_EQ(copy.line({"rev-parse", "HEAD"}), id);
+}
+
+TEST_F(GitRepositoryTest, RaisesWithTheWordsOfGit)
+{
+    const auto repository = makeRepository();
+    try
+    {
+        repository.git({"rev-parse", "--verify", "nothing"});
+        FAIL() << "no exception";
+    }
+    catch (const std::runtime_error &error)
+    {
+        EXPECT_THAT(error.what(), HasSubstr("rev-parse --verify nothing"));
+        EXPECT_THAT(error.what(), HasSubstr("fatal: Needed a single revision"));
+    }
+    EXPECT_EQ(repository.tryGit({"rev-parse", "--verify", "nothing"}).exitStatus, 128);
+}
+
+} // namespace

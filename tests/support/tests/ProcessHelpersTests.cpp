@@ -1,0 +1,155 @@
+// SPDX-License-Identifier: MIT
+#include <chrono>
+#include <csignal>
+#include <cstdlib>
+#include <filesystem>
+#include <fstream>
+#include <stdexcept>
+#include <string>
+
+#include <fcntl.h>
+#include <gtest/gtest-spi.h>
+#include <gtest/gtest.h>
+#include <unistd.h>
+
+#include "support/Descriptors.hpp"
+#include "support/TemporaryFolder.hpp"
+#include "support/UnprivilegedUser.hpp"
+
+namespace
+{
+
+using vclink::test::NoDescriptorLeak;
+using vclink::test::openDescriptors;
+using vclink::test::runAsUnprivilegedUser;
+using namespace std::chrono_literals;
+
+TEST(OpenDescriptors, TellWhatIsOpen)
+{
+    const auto before = openDescriptors();
+    const int descriptor = ::open("/dev/null", O_RDONLY | O_CLOEXEC);
+    auto expected = before;
+    expected[descriptor] = "/dev/null";
+    EXPECT_EQ(openDescriptors(), expected);
+    ::close(descriptor);
+    EXPECT_EQ(openDescriptors(), before);
+}
+
+TEST(NoDescriptorLeak, FailsTheTestThatLeavesOneOpen)
+{
+    static int descriptor = -1;
+    EXPECT_NONFATAL_FAILURE(
+        {
+            const NoDescriptorLeak check;
+            descriptor = ::open("/dev/null", O_RDONLY | O_CLOEXEC);
+        },
+        "descriptors have changed");
+    ::close(descriptor);
+}
+
+TEST(UnprivilegedUser, IsRefusedWhatRootIsNot)
+{
+    const vclink::test::TemporaryFolder folder;
+    std::ofstream(folder / "secret") << "text";
+    std::filesystem::permissions(folder / "secret", std::filesystem::perms::none);
+    const auto answer = runAsUnprivilegedUser(
+        [&]() -> std::string { return std::ifstream(folder / "secret") ? "it reads" : ""; });
+    EXPECT_EQ(answer, "");
+}
+
+TEST(UnprivilegedUser, CannotTakeThePrivilegesBack)
+{
+    const auto answer = runAsUnprivilegedUser(
+        []() -> std::string
+        {
+            if (::getuid() == 0 || ::geteuid() == 0 || ::getegid() == 0)
+                return "it is privileged";
+            return ::setuid(0) == 0 || ::setgid(0) == 0 ? "it became privileged again" : "";
+        });
+    EXPECT_EQ(answer, "");
+}
+
+TEST(UnprivilegedUser, IsInNoGroupOfRoots)
+{
+    const int expected = vclink::test::runsAsRoot() ? 0 : ::getgroups(0, nullptr);
+    const auto answer =
+        runAsUnprivilegedUser([] { return std::to_string(::getgroups(0, nullptr)); });
+    EXPECT_EQ(answer, std::to_string(expected));
+}
+
+TEST(UnprivilegedUser, MayBeGivenATree)
+{
+    const vclink::test::TemporaryFolder folder;
+    std::filesystem::create_directory(folder / "tree");
+    std::ofstream(folder / "tree/file") << "text";
+    std::filesystem::create_symlink("/nonexistent", folder / "tree/link");
+    vclink::test::giveToUnprivilegedUser(folder / "tree");
+    const auto answer = runAsUnprivilegedUser(
+        [&]() -> std::string
+        {
+            std::ofstream stream(folder / "tree/file");
+            stream << "more" << std::flush;
+            return stream ? "" : "it can't write";
+        });
+    EXPECT_EQ(answer, "");
+}
+
+TEST(UnprivilegedUser, AnswersWithTheActionsText)
+{
+    EXPECT_EQ(runAsUnprivilegedUser([] { return std::string(200'000, 'x'); }),
+              std::string(200'000, 'x'));
+}
+
+TEST(UnprivilegedUser, AnswersWithTheTextOfAnException)
+{
+    EXPECT_EQ(runAsUnprivilegedUser([]() -> std::string { throw std::runtime_error("why"); }),
+              "exception: why");
+    EXPECT_EQ(runAsUnprivilegedUser([]() -> std::string { throw 1; }),
+              "exception of a type that has no text");
+}
+
+TEST(UnprivilegedUser, TellsHowAChildEndedThatDidNotAnswer)
+{
+    EXPECT_EQ(runAsUnprivilegedUser([]() -> std::string { ::_exit(3); }),
+              "the child process ended early, with status 3");
+    EXPECT_EQ(runAsUnprivilegedUser(
+                  []() -> std::string
+                  {
+                      ::raise(SIGKILL);
+                      return "";
+                  }),
+              "the child process ended by signal 9");
+}
+
+TEST(UnprivilegedUser, WaitsNoLongerThanAllowed)
+{
+    const auto start = std::chrono::steady_clock::now();
+    EXPECT_EQ(runAsUnprivilegedUser(
+                  []() -> std::string
+                  {
+                      ::sleep(30);
+                      return "";
+                  },
+                  200ms),
+              "the child process took too long");
+    EXPECT_LT(std::chrono::steady_clock::now() - start, 10s);
+}
+
+TEST(UnprivilegedUser, LeavesTheParentsExitHandlersAlone)
+{
+    const vclink::test::TemporaryFolder folder;
+    static std::string mark;
+    mark = folder / "mark";
+    std::atexit([] { std::ofstream{mark} << "x"; });
+    std::filesystem::permissions(folder.path(), std::filesystem::perms(01777));
+    EXPECT_EQ(runAsUnprivilegedUser([] { return std::string(); }), "");
+    EXPECT_FALSE(std::filesystem::exists(folder / "mark"));
+}
+
+TEST(UnprivilegedUser, LeavesNoDescriptorOpen)
+{
+    const NoDescriptorLeak check;
+    EXPECT_EQ(runAsUnprivilegedUser([] { return std::string("answer"); }), "answer");
+}
+
+} // namespace

@@ -1,0 +1,188 @@
+// SPDX-License-Identifier: MIT
+#include <filesystem>
+#include <string>
+
+#include <git2.h>
+#include <gtest/gtest.h>
+
+#include "support/Descriptors.hpp"
+#include "support/GitTest.hpp"
+#include "support/LibGit2Session.hpp"
+#include "support/text.hpp"
+#include "util/repository.hpp"
+#include "vclink/git/LibGit2Exception.hpp"
+
+namespace
+{
+
+namespace git = vclink::git;
+using vclink::test::asPath;
+using vclink::test::GitRepository;
+
+std::string asHex(const git_oid &id)
+{
+    return git_oid_tostr_s(&id);
+}
+
+/// What was raised; a success is code 0.
+template <class Action> git::GitError raisedBy(Action action)
+{
+    try
+    {
+        action();
+    }
+    catch (const git::LibGit2Exception &exception)
+    {
+        return exception.getError();
+    }
+    return {};
+}
+
+class RepositoryHelpers : public vclink::test::GitTest
+{
+  protected:
+    git::OwnedHandle<git_repository> open(const GitRepository &repository) const
+    {
+        return git::openRepository(asPath(repository.path()));
+    }
+
+    vclink::test::LibGit2Session session_{environment()};
+};
+
+TEST_F(RepositoryHelpers, OpenTheRepositoryOfTheFolder)
+{
+    const auto repository = makeRepository("gr\xC3\xBC\xC3\x9F \xFF");
+    const auto opened = open(repository);
+    EXPECT_EQ(git_repository_workdir(opened.get()), repository.path().string() + "/");
+    EXPECT_EQ(git_repository_is_bare(opened.get()), 0);
+}
+
+TEST_F(RepositoryHelpers, OpenNothingAboveTheFolder)
+{
+    const auto repository = makeRepository();
+    repository.makeFolder("sub");
+    const auto error = raisedBy([&] { git::openRepository(asPath(repository / "sub")); });
+    EXPECT_EQ(error.getCode(), GIT_ENOTFOUND);
+    EXPECT_EQ(error.getErrorClass(), GIT_ERROR_REPOSITORY);
+    EXPECT_NE(vclink::test::asUtf8(error.getMessage()).find("could not find repository"),
+              std::string::npos);
+}
+
+TEST_F(RepositoryHelpers, OpenANewHandleEachTimeAndCloseIt)
+{
+    const auto repository = makeRepository();
+    open(repository);
+    const vclink::test::NoDescriptorLeak noLeak;
+    const auto first = open(repository);
+    const auto second = open(repository);
+    EXPECT_NE(first.get(), second.get());
+    EXPECT_EQ(raisedBy([&] { git::openRepository(asPath(folder() / "missing")); }).getCode(),
+              GIT_ENOTFOUND);
+}
+
+TEST_F(RepositoryHelpers, GetTheIndex)
+{
+    auto repository = makeRepository();
+    repository.write("file", "x");
+    repository.add();
+    const auto opened = open(repository);
+    const auto index = git::getRepositoryIndex(opened.get());
+    EXPECT_EQ(git_index_entrycount(index.get()), 1U);
+    EXPECT_EQ(git_index_owner(index.get()), opened.get());
+}
+
+TEST_F(RepositoryHelpers, RaiseForAnIndexThatCannotBeRead)
+{
+    const auto repository = makeRepository();
+    repository.write(".git/index",
+                     "this is no index, and long enough to be told from an empty one");
+    const auto opened = open(repository);
+    const auto error = raisedBy([&] { git::getRepositoryIndex(opened.get()); });
+    EXPECT_EQ(error.getCode(), GIT_ERROR);
+    EXPECT_EQ(error.getErrorClass(), GIT_ERROR_INDEX);
+}
+
+TEST_F(RepositoryHelpers, WriteTheIndex)
+{
+    const auto repository = makeRepository();
+    repository.write("file", "x");
+    const auto opened = open(repository);
+    const auto index = git::getRepositoryIndex(opened.get());
+    ASSERT_EQ(git_index_add_bypath(index.get(), "file"), 0);
+    EXPECT_EQ(repository.git({"ls-files"}), "");
+    git::writeIndex(index.get());
+    EXPECT_EQ(repository.git({"ls-files"}), "file\n");
+}
+
+TEST_F(RepositoryHelpers, RaiseWhereTheIndexIsLocked)
+{
+    const auto repository = makeRepository();
+    repository.write("file", "x");
+    repository.write(".git/index.lock", "");
+    const auto opened = open(repository);
+    const auto index = git::getRepositoryIndex(opened.get());
+    ASSERT_EQ(git_index_add_bypath(index.get(), "file"), 0);
+    EXPECT_EQ(raisedBy([&] { git::writeIndex(index.get()); }).getCode(), GIT_ELOCKED);
+    EXPECT_TRUE(std::filesystem::exists(repository / ".git/index.lock"));
+    EXPECT_FALSE(std::filesystem::exists(repository / ".git/index"));
+}
+
+TEST_F(RepositoryHelpers, WriteTheTreeThatGitWrites)
+{
+    auto repository = makeRepository();
+    for (const auto *name : {"b", "sub/deep/c", "a", "\xFF"})
+        repository.write(name, name);
+    repository.write("tool", "x");
+    repository.setMode("tool", 0755);
+    repository.symlink("a", "link");
+    repository.add();
+    const auto opened = open(repository);
+    const auto index = git::getRepositoryIndex(opened.get());
+    const git_oid id = git::writeIndexTree(index.get());
+    EXPECT_EQ(asHex(id), repository.line({"write-tree"}));
+}
+
+TEST_F(RepositoryHelpers, RaiseForATreeOfAnIndexInConflict)
+{
+    auto repository = makeRepository();
+    repository.write("file", "base\n");
+    repository.commitAll("base");
+    repository.git({"checkout", "--quiet", "-b", "other"});
+    repository.write("file", "theirs\n");
+    repository.commitAll("theirs");
+    repository.git({"checkout", "--quiet", "main"});
+    repository.write("file", "ours\n");
+    repository.commitAll("ours");
+    repository.tryGit({"-c", "user.name=T", "-c", "user.email=t@example.com", "merge", "other"});
+    ASSERT_NE(repository.git({"ls-files", "--unmerged"}), "");
+    const auto opened = open(repository);
+    const auto index = git::getRepositoryIndex(opened.get());
+    EXPECT_EQ(raisedBy([&] { git::writeIndexTree(index.get()); }).getCode(), GIT_EUNMERGED);
+}
+
+TEST_F(RepositoryHelpers, LookATreeUp)
+{
+    auto repository = makeRepository();
+    repository.write("sub/file", "x");
+    repository.commitAll("first");
+    const auto opened = open(repository);
+    git_oid id;
+    ASSERT_EQ(git_oid_fromstr(&id, repository.line({"rev-parse", "HEAD^{tree}"}).c_str()), 0);
+    const auto tree = git::lookupTree(opened.get(), &id);
+    EXPECT_EQ(git_tree_entrycount(tree.get()), 1U);
+    EXPECT_STREQ(git_tree_entry_name(git_tree_entry_byindex(tree.get(), 0)), "sub");
+}
+
+TEST_F(RepositoryHelpers, RaiseForAnIdThatIsNoTree)
+{
+    auto repository = makeRepository();
+    git_oid id;
+    ASSERT_EQ(git_oid_fromstr(&id, repository.commit("first").c_str()), 0);
+    const auto opened = open(repository);
+    EXPECT_EQ(raisedBy([&] { git::lookupTree(opened.get(), &id); }).getCode(), GIT_ENOTFOUND);
+    git_oid missing;
+    ASSERT_EQ(git_oid_fromstr(&missing, std::string(40, '1').c_str()), 0);
+    EXPECT_EQ(raisedBy([&] { git::lookupTree(opened.get(), &missing); }).getCode(), GIT_ENOTFOUND);
+}
+
+} // namespace
