@@ -1,0 +1,55 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <memory>
+#include <optional>
+#include <string>
+#include <utility>
+#include <vector>
+
+#include "Command.hpp"
+
+namespace vclink::shell
+{
+
+class Output;
+
+/// What the person set before the command.
+struct Settings
+{
+    /// folders to start in, one after the other
+    std::vector<std::string> folders;
+    std::optional<unsigned> severities;
+    std::optional<std::string> locale;
+};
+
+/// Reads the arguments of the program.
+class CommandLine
+{
+  public:
+    CommandLine();
+    CommandLine(const CommandLine &) = delete;
+    CommandLine &operator=(const CommandLine &) = delete;
+    ~CommandLine();
+
+    /// Reads the arguments. To be called once.
+    /// @return nothing when there is a command to run; otherwise the status to end with, the person
+    ///         having been told why, or helped
+    /// @throws ShellFailure when the help can't be written
+    std::optional<ExitStatus> parse(int argc, const char *const *argv, Output &output);
+
+    const Settings &settings() const noexcept;
+    /// The command to run.
+    Command &command() const noexcept;
+
+  private:
+    void declareSettings();
+    void declareCommands();
+
+    std::unique_ptr<CLI::App> line_;
+    Settings settings_;
+    std::vector<std::pair<CLI::App *, std::unique_ptr<Command>>> commands_;
+    Command *chosen_ = nullptr;
+};
+
+} // namespace vclink::shell

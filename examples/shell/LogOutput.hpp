@@ -1,0 +1,26 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <memory>
+
+namespace vclink::shell
+{
+
+/// Shows the library's log records on standard error while it lives: one line a record, its
+/// severity in brackets before its text. Lines that a record brings itself are indented, so that
+/// only records begin with a bracket.
+class LogOutput
+{
+  public:
+    /// @param severities what is to be shown
+    explicit LogOutput(unsigned severities);
+    LogOutput(const LogOutput &) = delete;
+    LogOutput &operator=(const LogOutput &) = delete;
+    ~LogOutput();
+
+  private:
+    struct Impl;
+    std::unique_ptr<Impl> impl_;
+};
+
+} // namespace vclink::shell

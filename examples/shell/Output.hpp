@@ -1,0 +1,39 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <string>
+#include <string_view>
+
+namespace vclink::shell
+{
+
+/// Standard output. Text is collected and written in large pieces; what is not flushed is lost.
+class Output
+{
+  public:
+    Output();
+    Output(const Output &) = delete;
+    Output &operator=(const Output &) = delete;
+    ~Output() = default;
+
+    /// @throws ShellFailure when standard output can't be written
+    void write(std::string_view text);
+    /// @throws ShellFailure when standard output can't be written; nothing is left to flush then
+    void flush();
+
+    /// Whether a person sees the output and a colour says something to them.
+    bool hasColour() const noexcept;
+
+  private:
+    std::string text_;
+    bool hasColour_;
+};
+
+/// Whether a person sees what is written to standard error.
+bool errorsAreOnTerminal() noexcept;
+
+/// Makes sure that standard input, output and error are taken, so that no file that is opened later
+/// gets one of their numbers and what is meant for it. Where one was closed, using it still fails.
+void holdStandardDescriptors();
+
+} // namespace vclink::shell

@@ -1,0 +1,114 @@
+// SPDX-License-Identifier: MIT
+#include <filesystem>
+#include <iostream>
+#include <string>
+#include <system_error>
+#include <vector>
+
+#include "Output.hpp"
+#include "Session.hpp"
+#include "commands.hpp"
+#include "fl/i18n/convert.hpp"
+#include "names.hpp"
+#include "pathArguments.hpp"
+#include "states.hpp"
+
+namespace vclink::shell
+{
+namespace
+{
+
+std::string describeStates()
+{
+    std::string text = "One line for each file: its state, a tab, and its path from the root of "
+                       "the working copy.\nIgnored files are left out. The states:\n\n";
+    for (const StateWords &words : stateWords)
+    {
+        const std::string name = words.name;
+        text += "  " + name + std::string(14 - name.size(), ' ') + words.meaning + '\n';
+    }
+    text += "\nWithout -z, a name with a control character, a double quote, a backslash or bytes "
+            "that are not\nUTF-8 is shown in double quotes and escaped, as git does. The counts "
+            "go to standard error, if\nthat is a terminal.";
+    return text;
+}
+
+/// The states of what the person named. A folder is asked for by itself; all files go in one call.
+FileStateMap collectStates(CMAdapter &adapter, const std::vector<std::string> &arguments)
+{
+    FileStateMap states;
+    std::vector<upath> files;
+    for (const std::string &argument : arguments)
+    {
+        const std::filesystem::path path = resolveArgument(argument);
+        std::error_code ignored;
+        FileStateMap below;
+        if (std::filesystem::is_directory(path, ignored))
+        {
+            below = adapter.getFolderStates(makePath(path));
+        }
+        // A folder without files of its own may be a submodule, which is a single entry.
+        if (below.empty())
+        {
+            files.push_back(makePath(path));
+        }
+        states.merge(below);
+    }
+    FileStateMap single = adapter.getFileStates(files);
+    states.merge(single);
+    return states;
+}
+
+class StatusCommand : public Command
+{
+  public:
+    void declare(CLI::App &line) override
+    {
+        line.footer(describeStates());
+        line.add_flag("-z", endWithNul_,
+                      "End each line with NUL, and write names byte for byte, without colour");
+        paths_ = declarePaths(line, "Only these files, and all files below these folders");
+    }
+
+    ExitStatus run(Session &session) override
+    {
+        CMAdapter &adapter = session.adapter();
+        const upath &root = adapter.getRootFolder();
+        const FileStateMap states = paths_->empty() ? adapter.getFolderStates(root)
+                                                    : collectStates(adapter, paths_->results());
+        for (const auto &[path, state] : states)
+        {
+            writeRecord(session.output(), wordsFor(state), relativeName(path, root));
+        }
+        session.output().flush();
+        if (errorsAreOnTerminal())
+        {
+            std::cerr << countStates(states) << '\n';
+        }
+        return Done;
+    }
+
+  private:
+    void writeRecord(Output &output, const StateWords &words, const ustring &name) const
+    {
+        const bool coloured = !endWithNul_ && *words.colour != '\0' && output.hasColour();
+        std::string record = coloured ? words.colour : "";
+        record += words.name;
+        record += coloured ? "\33[m\t" : "\t";
+        record += endWithNul_ ? fl::i18n::ustring_to_utf8(name) : quoteName(name);
+        record += endWithNul_ ? '\0' : '\n';
+        output.write(record);
+    }
+
+    bool endWithNul_ = false;
+    const CLI::Option *paths_ = nullptr;
+};
+
+} // namespace
+
+std::unique_ptr<Command> makeStatusCommand()
+{
+    return std::make_unique<StatusCommand>();
+}
+
+} // namespace vclink::shell

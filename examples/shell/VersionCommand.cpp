@@ -1,0 +1,34 @@
+// SPDX-License-Identifier: MIT
+#include "Output.hpp"
+#include "Session.hpp"
+#include "commands.hpp"
+#include "vclink/git/LibGit2Version.hpp"
+
+namespace vclink::shell
+{
+namespace
+{
+
+class VersionCommand : public Command
+{
+  public:
+    void declare(CLI::App & /*line*/) override
+    {
+    }
+
+    ExitStatus run(Session &session) override
+    {
+        session.output().write("vclink-shell " VCLINK_SHELL_VERSION "\n");
+        session.output().write("libgit2 " + git::LibGit2Version().toString() + "\n");
+        return Done;
+    }
+};
+
+} // namespace
+
+std::unique_ptr<Command> makeVersionCommand()
+{
+    return std::make_unique<VersionCommand>();
+}
+
+} // namespace vclink::shell

@@ -1,0 +1,46 @@
+// SPDX-License-Identifier: MIT
+#include "failures.hpp"
+
+#include <exception>
+#include <iostream>
+
+#include "fl/i18n/convert.hpp"
+#include "foundation/core/except/IUserException.hpp"
+#include "names.hpp"
+#include "vclink/util/exception/CancelledOperationException.hpp"
+
+namespace vclink::shell
+{
+
+void complain(const std::string &text)
+{
+    std::cerr << "vclink-shell: " << makePrintable(fl::i18n::utf8_to_ustring(text)) << '\n';
+}
+
+ExitStatus reportFailure()
+{
+    try
+    {
+        throw;
+    }
+    catch (const util::exception::CancelledOperationException &cancelled)
+    {
+        complain(cancelled.what());
+        return Cancelled;
+    }
+    catch (const foundation::core::except::IUserException &failure)
+    {
+        complain(fl::i18n::ustring_to_utf8(failure.GetUnicodeMessageTxt()));
+    }
+    catch (const std::exception &failure)
+    {
+        complain(failure.what());
+    }
+    catch (...)
+    {
+        complain("The command ended with an error of an unknown kind.");
+    }
+    return Failed;
+}
+
+} // namespace vclink::shell

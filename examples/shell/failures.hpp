@@ -1,0 +1,27 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <stdexcept>
+#include <string>
+
+#include "exitStatus.hpp"
+
+namespace vclink::shell
+{
+
+/// What the shell itself can't do. The text is for the person at the terminal, in any bytes.
+class ShellFailure : public std::runtime_error
+{
+  public:
+    using std::runtime_error::runtime_error;
+};
+
+/// Writes a line, or a few, to standard error, under the program's name.
+void complain(const std::string &text);
+
+/// Tells the person of the exception in flight, in the words that it has for them: its localized
+/// text where it has one. To be called in a handler only.
+/// @return the status to end with
+ExitStatus reportFailure();
+
+} // namespace vclink::shell

@@ -1,0 +1,77 @@
+// SPDX-License-Identifier: MIT
+#include <filesystem>
+#include <optional>
+#include <string>
+#include <system_error>
+
+#include "CommandLine.hpp"
+#include "LogOutput.hpp"
+#include "Output.hpp"
+#include "Session.hpp"
+#include "failures.hpp"
+#include "fl/i18n/VkLocale.hpp"
+#include "vclink_host/locale.hpp"
+
+namespace vclink::shell
+{
+namespace
+{
+
+void enterFolder(const std::string &folder)
+{
+    std::error_code error;
+    std::filesystem::current_path(folder, error);
+    if (error)
+    {
+        throw ShellFailure("The folder " + folder + " can't be entered: " + error.message() + ".");
+    }
+}
+
+ExitStatus runCommand(const Settings &settings, Command &command, Output &output)
+{
+    for (const std::string &folder : settings.folders)
+    {
+        // An empty one changes nothing, as with git.
+        if (!folder.empty())
+        {
+            enterFolder(folder);
+        }
+    }
+    if (settings.locale)
+    {
+        vclink_host::setGlobalLocale(fl::i18n::VkLocale(*settings.locale));
+    }
+    std::optional<LogOutput> log;
+    if (settings.severities)
+    {
+        log.emplace(*settings.severities);
+    }
+    Session session(output);
+    const ExitStatus status = command.run(session);
+    output.flush();
+    return status;
+}
+
+ExitStatus run(int argc, const char *const *argv)
+{
+    try
+    {
+        Output output;
+        CommandLine line;
+        const std::optional<ExitStatus> end = line.parse(argc, argv, output);
+        return end ? *end : runCommand(line.settings(), line.command(), output);
+    }
+    catch (...)
+    {
+        return reportFailure();
+    }
+}
+
+} // namespace
+} // namespace vclink::shell
+
+int main(int argc, char **argv)
+{
+    vclink::shell::holdStandardDescriptors();
+    return vclink::shell::run(argc, argv);
+}

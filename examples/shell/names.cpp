@@ -1,0 +1,140 @@
+// SPDX-License-Identifier: MIT
+#include "names.hpp"
+
+#include <array>
+#include <cstdio>
+#include <string_view>
+#include <system_error>
+
+#include "failures.hpp"
+#include "fl/i18n/convert.hpp"
+
+namespace vclink::shell
+{
+namespace
+{
+
+bool isBetween(char16_t unit, char16_t first, char16_t last)
+{
+    return unit >= first && unit <= last;
+}
+
+/// C0, DEL and C1, all of which terminals may obey.
+bool isControl(char16_t unit)
+{
+    return unit < 0x20 || isBetween(unit, 0x7F, 0x9F);
+}
+
+void appendOctal(ustring &text, unsigned byte)
+{
+    std::array<char, 8> digits{};
+    const int count = std::snprintf(digits.data(), digits.size(), "\\%03o", byte);
+    text.append(digits.data(), digits.data() + count);
+}
+
+void appendControl(ustring &text, char16_t unit)
+{
+    constexpr std::u16string_view letters = u"abtnvfr";
+    if (isBetween(unit, u'\a', u'\r'))
+    {
+        text += u'\\';
+        text += letters[static_cast<std::size_t>(unit - u'\a')];
+        return;
+    }
+    if (unit > 0x7F)
+    {
+        appendOctal(text, 0xC2);
+    }
+    appendOctal(text, unit);
+}
+
+/// Each escape makes the text longer.
+/// @param kept control characters that stay
+/// @param special further characters that get a backslash
+ustring escape(const ustring &text, std::u16string_view kept, std::u16string_view special)
+{
+    ustring escaped;
+    escaped.reserve(text.size() + 2);
+    for (std::size_t index = 0; index < text.size(); ++index)
+    {
+        const char16_t unit = text[index];
+        const bool pairs = isBetween(unit, 0xD800, 0xDBFF) && index + 1 < text.size() &&
+                           isBetween(text[index + 1], 0xDC00, 0xDFFF);
+        if (pairs)
+        {
+            escaped.append(text, index, 2);
+            ++index;
+        }
+        else if (isBetween(unit, 0xDC80, 0xDCFF))
+        {
+            // How the host's text holds a byte that is not UTF-8.
+            appendOctal(escaped, unit & 0xFFU);
+        }
+        else if (isControl(unit) && kept.find(unit) == std::u16string_view::npos)
+        {
+            appendControl(escaped, unit);
+        }
+        else
+        {
+            if (special.find(unit) != std::u16string_view::npos)
+            {
+                escaped += u'\\';
+            }
+            escaped += unit;
+        }
+    }
+    return escaped;
+}
+
+} // namespace
+
+std::filesystem::path currentFolder()
+{
+    std::error_code error;
+    std::filesystem::path folder = std::filesystem::current_path(error);
+    if (error)
+    {
+        throw ShellFailure("The current folder can't be found: " + error.message() + ".");
+    }
+    return folder;
+}
+
+std::filesystem::path resolveArgument(const std::string &argument)
+{
+    std::string name = argument;
+    while (name.size() > 1 && name.back() == '/')
+    {
+        name.pop_back();
+    }
+    return currentFolder() / name;
+}
+
+upath makePath(const std::filesystem::path &path)
+{
+    return upath(fl::i18n::utf8_to_ustring(path.string()));
+}
+
+ustring relativeName(const upath &path, const upath &root)
+{
+    const ustring &text = path.string();
+    std::size_t start = root.string().size();
+    while (start < text.size() && text[start] == u'/')
+    {
+        ++start;
+    }
+    return text.substr(start);
+}
+
+std::string quoteName(const ustring &name)
+{
+    const ustring escaped = escape(name, u"", u"\"\\");
+    std::string text = fl::i18n::ustring_to_utf8(escaped);
+    return escaped.size() == name.size() ? text : '"' + text + '"';
+}
+
+std::string makePrintable(const ustring &text)
+{
+    return fl::i18n::ustring_to_utf8(escape(text, u"\n\t", u""));
+}
+
+} // namespace vclink::shell

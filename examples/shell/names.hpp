@@ -1,0 +1,36 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <filesystem>
+#include <string>
+
+#include "fl/filesystem/path.hpp"
+#include "fl/ustring.hpp"
+
+namespace vclink::shell
+{
+
+/// The current folder, absolute and free of symbolic links.
+/// @throws ShellFailure when there is none any more
+std::filesystem::path currentFolder();
+
+/// A name as the person gave it, made absolute from the current folder, without slashes at its end.
+/// Its bytes stay as they are.
+std::filesystem::path resolveArgument(const std::string &argument);
+
+/// A path as the host's value. Its bytes stay as they are.
+upath makePath(const std::filesystem::path &path);
+
+/// The path from `root` to `path`, which lies below it.
+ustring relativeName(const upath &path, const upath &root);
+
+/// A file name that stays on its line and does nothing to the terminal: where it holds a control
+/// character, a double quote, a backslash or a byte that is not UTF-8, it is put in double quotes
+/// and these are escaped as in C, the way git shows such names. Other names stay as they are.
+std::string quoteName(const ustring &name);
+
+/// A text with what could do something to the terminal escaped as in quoteName(), line feeds and
+/// tabs left as they are.
+std::string makePrintable(const ustring &text);
+
+} // namespace vclink::shell

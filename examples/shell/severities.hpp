@@ -1,0 +1,23 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <optional>
+#include <string>
+
+namespace vclink::shell
+{
+
+/// The name of the library's logger.
+inline constexpr const char *libraryLogger = "vclink::git";
+
+/// The mask that a list of severities means: names separated by commas, or a number, decimal or
+/// with "0x" hexadecimal. Nothing if it can't be understood.
+std::optional<unsigned> parseSeverities(const std::string &text);
+
+/// The names that parseSeverities() knows, separated by commas and blanks.
+std::string severityNames();
+
+/// The name of one severity; its number where it has no name.
+std::string severityName(unsigned severity);
+
+} // namespace vclink::shell

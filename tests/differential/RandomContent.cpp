@@ -1,0 +1,102 @@
+// SPDX-License-Identifier: MIT
+#include "RandomContent.hpp"
+
+#include <algorithm>
+
+namespace vclink::test
+{
+namespace
+{
+
+constexpr std::size_t fewestLines = 6;
+
+std::string makeLine(Random &random)
+{
+    std::string line;
+    for (std::size_t length = 12 + random.below(8); length > 0; --length)
+    {
+        line += static_cast<char>('a' + random.below(26));
+    }
+    return line;
+}
+
+std::string makeLines(Random &random, const char *lineEnd)
+{
+    std::string text;
+    for (std::size_t count = fewestLines + random.below(8); count > 0; --count)
+    {
+        text += makeLine(random) + lineEnd;
+    }
+    return text;
+}
+
+} // namespace
+
+std::string makeContent(Random &random)
+{
+    switch (random.below(20))
+    {
+    case 0:
+        return {};
+    case 1:
+        return makeLine(random);
+    case 2:
+        return makeLines(random, "\r\n");
+    case 3:
+        return makeLine(random) + '\0' + '\xFF' + makeLine(random);
+    default:
+        return makeLines(random, "\n");
+    }
+}
+
+std::string makeSimilar(Random &random, const std::string &content)
+{
+    const auto lines = std::count(content.begin(), content.end(), '\n');
+    if (static_cast<std::size_t>(lines) < fewestLines)
+    {
+        return makeContent(random);
+    }
+    std::size_t begin = 0;
+    for (auto skipped = random.below(static_cast<std::size_t>(lines)); skipped > 0; --skipped)
+    {
+        begin = content.find('\n', begin) + 1;
+    }
+    std::string similar = content;
+    return similar.replace(begin, content.find('\n', begin) - begin, makeLine(random));
+}
+
+std::string makeSameSize(Random &random, const std::string &content)
+{
+    if (content.empty())
+    {
+        return makeContent(random);
+    }
+    std::string other = content;
+    char &byte = other[random.below(other.size())];
+    byte = byte == 'A' ? 'B' : 'A';
+    return other;
+}
+
+std::string makeIgnoreRules(Random &random)
+{
+    // A rule that takes names back in holds for no folder: there libgit2 differs from git.
+    static const std::vector<std::string> rules{
+        "*.log",  "ignored*", "build/",     "/tmp/",     "!ignored5*", "*~",
+        "src/a*", "**/deep",  "deep/**",    "\\#*",      "\\!*",       "a b*",
+        "*.c",    "!*1.c",    "*\xC3\xBC*", "[ab]*.txt", "\xFF*",      "/a",
+        "dir?/",  "a/*",      "*",          "data*.bin"};
+    std::string text = "# " + makeLine(random) + "\n\n";
+    for (std::size_t count = 1 + random.below(5); count > 0; --count)
+    {
+        text += random.pick(rules) + '\n';
+    }
+    return text;
+}
+
+std::string makeConflictMarkers(Random &random)
+{
+    return "<<<<<<< ours\n" + makeLine(random) + "\n=======\n" + makeLine(random) +
+           "\n>>>>>>> theirs\n";
+}
+
+} // namespace vclink::test

@@ -1,0 +1,16 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <string>
+
+namespace vclink::test
+{
+
+/// Text as a C string literal shows it, all bytes outside ASCII as octal numbers. fast-import takes
+/// paths in this form, and people can read it.
+std::string quote(const std::string &text);
+
+/// A value as one of Git's configuration files holds it.
+std::string quoteConfigValue(const std::string &value);
+
+} // namespace vclink::test

@@ -1,0 +1,119 @@
+// SPDX-License-Identifier: MIT
+#include <gmock/gmock.h>
+
+#include "ShellTest.hpp"
+
+namespace vclink::test
+{
+namespace
+{
+
+using testing::HasSubstr;
+using testing::Not;
+using testing::StartsWith;
+
+class ShellFailures : public ShellTest
+{
+};
+
+const std::string english = "vclink-shell: Git could not complete the operation: ";
+const std::string german = "vclink-shell: Git konnte den Vorgang nicht abschlie\xC3\x9F"
+                           "en: ";
+
+TEST_F(ShellFailures, TellTheTextOfTheExceptionAndEndWithOne)
+{
+    const CommandResult result = runIn(makeBrokenRepository().path(), {"status"});
+    EXPECT_EQ(result.exitStatus, 1);
+    EXPECT_EQ(result.output, "");
+    EXPECT_THAT(result.errors, StartsWith(english));
+    EXPECT_THAT(result.errors, HasSubstr("missing ']' in section header"));
+    EXPECT_THAT(result.errors, HasSubstr("code -1"));
+}
+
+TEST_F(ShellFailures, AreToldInTheLanguageThatWasAskedFor)
+{
+    const GitRepository repository = makeBrokenRepository();
+    const CommandResult result = runIn(repository.path(), {"--lang", "de", "status"});
+    EXPECT_EQ(result.exitStatus, 1);
+    EXPECT_THAT(result.errors, StartsWith(german));
+    EXPECT_THAT(runIn(repository.path(), {"--lang", "ja_JP.UTF-8", "status"}).errors,
+                HasSubstr("\xE3\x82\xB3\xE3\x83\xBC\xE3\x83\x89 -1"));
+    EXPECT_THAT(runIn(repository.path(), {"--lang", "xx", "status"}).errors, StartsWith(english));
+}
+
+TEST_F(ShellFailures, AreToldInTheLanguageOfTheEnvironmentUnlessAnotherWasAskedFor)
+{
+    const GitRepository repository = makeBrokenRepository();
+    const auto run = [&](std::vector<std::string> arguments)
+    {
+        return shell(std::move(arguments))
+            .in(repository.path())
+            .environment("LC_ALL", "de_AT.UTF-8")
+            .run()
+            .errors;
+    };
+    EXPECT_THAT(run({"status"}), StartsWith(german));
+    EXPECT_THAT(run({"--lang", "en", "status"}), StartsWith(english));
+}
+
+TEST_F(ShellFailures, SayWhereNoWorkingCopyWasFound)
+{
+    std::filesystem::create_directory(folder() / "plain");
+    const CommandResult result = runIn(folder() / "plain", {"status"});
+    EXPECT_EQ(result.exitStatus, 1);
+    EXPECT_EQ(result.output, "");
+    EXPECT_EQ(result.errors, "vclink-shell: Neither " + (folder() / "plain").string() +
+                                 " nor any folder above it is a Git working copy.\n");
+}
+
+TEST_F(ShellFailures, SayWhereARepositoryIsThatCannotBeOpened)
+{
+    const GitRepository repository = makeRepository("damaged");
+    repository.remove(".git/HEAD");
+    repository.makeFolder("inside");
+    const CommandResult result = runIn(repository / "inside", {"status"});
+    EXPECT_EQ(result.exitStatus, 1);
+    EXPECT_THAT(result.errors,
+                HasSubstr("There is a repository in " + repository.path().string() + ", but"));
+}
+
+TEST_F(ShellFailures, SayThatTheFolderToWorkInCannotBeEntered)
+{
+    const CommandResult result = shell({"-C", "nowhere", "version"}).run();
+    EXPECT_EQ(result.exitStatus, 1);
+    EXPECT_EQ(result.output, "");
+    EXPECT_EQ(result.errors, "vclink-shell: The folder nowhere can't be entered: No such file or "
+                             "directory.\n");
+}
+
+TEST_F(ShellFailures, SayThatTheCurrentFolderIsGone)
+{
+    const CommandResult result =
+        Command({"sh", "-c", "mkdir gone && cd gone && rmdir ../gone && exec \"$0\" status",
+                 VCLINK_SHELL})
+            .in(folder().path())
+            .run();
+    EXPECT_EQ(result.exitStatus, 1);
+    EXPECT_THAT(result.errors, StartsWith("vclink-shell: The current folder can't be found: "));
+}
+
+TEST_F(ShellFailures, SayThatAPathCannotBeResolved)
+{
+    const GitRepository repository = makeRepository();
+    repository.symlink("loop", "loop");
+    const CommandResult result = runIn(repository.path(), {"status", "loop"});
+    EXPECT_EQ(result.exitStatus, 1);
+    EXPECT_EQ(result.output, "");
+    EXPECT_THAT(result.errors, HasSubstr((repository / "loop").string()));
+}
+
+TEST_F(ShellFailures, KeepControlCharactersOfNamesFromTheTerminal)
+{
+    const CommandResult result = shell({"-C", "a\33[2Jb\xFF", "version"}).run();
+    EXPECT_EQ(result.exitStatus, 1);
+    EXPECT_THAT(result.errors, HasSubstr("The folder a\\033[2Jb\\377 can't be entered"));
+    EXPECT_THAT(result.errors, Not(HasSubstr("\33")));
+}
+
+} // namespace
+} // namespace vclink::test

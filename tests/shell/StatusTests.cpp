@@ -1,0 +1,282 @@
+// SPDX-License-Identifier: MIT
+#include <algorithm>
+#include <map>
+#include <set>
+
+#include <gmock/gmock.h>
+
+#include "ShellTest.hpp"
+
+namespace vclink::test
+{
+namespace
+{
+
+using testing::ElementsAre;
+using testing::IsEmpty;
+using testing::UnorderedElementsAre;
+
+class ShellStatus : public ShellTest
+{
+};
+
+/// What the program calls what git tells with two letters.
+std::string stateFor(const std::string &letters)
+{
+    static const std::map<std::string, std::string> states{
+        {" M", "modified"}, {"M ", "modified"},    {"MM", "modified"}, {"MD", "modified"},
+        {"A ", "added"},    {"AM", "added"},       {"AD", "added"},    {"D ", "deleted"},
+        {" D", "missing"},  {"??", "unversioned"}, {"UU", "conflict"}, {"AA", "conflict"},
+        {"DU", "conflict"}, {"UD", "conflict"}};
+    return states.at(letters);
+}
+
+/// Every file's state, derived from git's own report. Renames are told as two changes.
+std::map<std::string, std::string> gitStates(const GitRepository &repository)
+{
+    std::map<std::string, std::string> states;
+    for (const auto &name : split(repository.git({"ls-files", "-z"}), '\0'))
+        states[name] = "clean";
+    const std::string report =
+        repository.git({"status", "--porcelain", "-z", "-uall", "--no-renames"});
+    for (const auto &line : split(report, '\0'))
+        states[line.substr(3)] = stateFor(line.substr(0, 2));
+    return states;
+}
+
+std::map<std::string, std::string> asMap(const Records &records)
+{
+    std::map<std::string, std::string> states;
+    for (const auto &[state, name] : records)
+        EXPECT_TRUE(states.emplace(name, state).second) << name << " stands there twice";
+    return states;
+}
+
+/// Files of each kind that git can tell apart, on two branches in conflict.
+GitRepository makeEveryState(const GitRepository &empty)
+{
+    GitRepository repository = empty;
+    for (const std::string name :
+         {"clean.txt", "edited.txt", "staged.txt", "staged and edited.txt", "staged and gone.txt",
+          "deleted.txt", "missing.txt", "folder/deep/kept.txt", "folder/edited.txt", "both.txt",
+          "theirs gone.txt", "ours gone.txt"})
+        repository.write(name, "the text of " + name + "\n");
+    repository.write(".gitignore", "*.ignored\n");
+    repository.commitAll("begin");
+    repository.git({"checkout", "--quiet", "-b", "other"});
+    repository.write("both.txt", "theirs\n");
+    repository.write("ours gone.txt", "theirs\n");
+    repository.remove("theirs gone.txt");
+    repository.commitAll("their work");
+    repository.git({"checkout", "--quiet", "main"});
+    repository.write("both.txt", "ours\n");
+    repository.write("theirs gone.txt", "ours\n");
+    repository.remove("ours gone.txt");
+    repository.commitAll("our work");
+    EXPECT_NE(
+        repository.tryGit({"-c", "user.name=A", "-c", "user.email=a@example.org", "merge", "other"})
+            .exitStatus,
+        0);
+
+    for (const std::string name : {"staged.txt", "staged and edited.txt", "staged and gone.txt",
+                                   "added.txt", "added and edited.txt", "added and gone.txt"})
+        repository.write(name, "changed text of " + name + "\n");
+    repository.add({"staged.txt", "staged and edited.txt", "staged and gone.txt", "added.txt",
+                    "added and edited.txt", "added and gone.txt"});
+    for (const std::string name :
+         {"edited.txt", "staged and edited.txt", "added and edited.txt", "folder/edited.txt"})
+        repository.write(name, "edited\n");
+    for (const std::string name : {"staged and gone.txt", "added and gone.txt", "missing.txt"})
+        repository.remove(name);
+    repository.git({"rm", "--quiet", "deleted.txt"});
+    repository.write("unversioned.txt", "");
+    repository.write("new folder/unversioned.txt", "");
+    repository.write("build.ignored", "");
+    return repository;
+}
+
+TEST_F(ShellStatus, TellsTheStateOfEveryFileAsGitReportsIt)
+{
+    const GitRepository repository = makeEveryState(makeRepository());
+    const auto expected = gitStates(repository);
+    std::set<std::string> kinds;
+    for (const auto &[name, state] : expected)
+        kinds.insert(state);
+    ASSERT_THAT(kinds, UnorderedElementsAre("added", "clean", "conflict", "deleted", "missing",
+                                            "modified", "unversioned"));
+    EXPECT_EQ(asMap(statesIn(repository.path())), expected);
+}
+
+TEST_F(ShellStatus, TellsARenamedFileAsUnknownUnderItsOldName)
+{
+    GitRepository repository = makeRepository();
+    repository.write("old", "a text that is long enough to be found again\n");
+    repository.commitAll("begin");
+    repository.git({"mv", "old", "new"});
+    EXPECT_EQ(repository.git({"status", "--porcelain"}), "R  old -> new\n");
+    EXPECT_THAT(statesIn(repository.path()), ElementsAre(Record("unknown", "old")));
+}
+
+TEST_F(ShellStatus, WritesOneLineAFileWithATabBetweenStateAndPath)
+{
+    GitRepository repository = makeRepository();
+    repository.write("b", "");
+    repository.write("a/a", "");
+    repository.commitAll("begin");
+    repository.write("c", "");
+    const CommandResult result = runIn(repository.path(), {"status"});
+    EXPECT_EQ(result.exitStatus, 0);
+    EXPECT_EQ(result.output, "clean\ta/a\nclean\tb\nunversioned\tc\n");
+    EXPECT_EQ(result.errors, "");
+}
+
+TEST_F(ShellStatus, WritesNulInsteadOfTheLineFeedWhenAskedTo)
+{
+    const GitRepository repository = makeRepository();
+    repository.write("a", "");
+    repository.write("b", "");
+    const std::string expected("unversioned\ta\0unversioned\tb\0", 28);
+    EXPECT_EQ(runIn(repository.path(), {"status", "-z"}).output, expected);
+}
+
+TEST_F(ShellStatus, ListsInTheOrderOfTheElementsOfPaths)
+{
+    const GitRepository repository = makeRepository();
+    for (const std::string name : {"a-b/x", "a/x", "a.txt", "a/b/c", "b"})
+        repository.write(name, "");
+    EXPECT_EQ(runIn(repository.path(), {"status"}).output,
+              "unversioned\ta/b/c\nunversioned\ta/x\nunversioned\ta-b/x\nunversioned\ta.txt\n"
+              "unversioned\tb\n");
+}
+
+TEST_F(ShellStatus, WritesNothingForAnEmptyWorkingCopy)
+{
+    const CommandResult result = runIn(makeRepository().path(), {"status"});
+    EXPECT_EQ(result.exitStatus, 0);
+    EXPECT_EQ(result.output, "");
+    EXPECT_EQ(result.errors, "");
+}
+
+TEST_F(ShellStatus, ShowsTheWholeWorkingCopyFromAnyFolderInsideIt)
+{
+    const GitRepository repository = makeRepository();
+    repository.write("top", "");
+    repository.write("a/b/deep", "");
+    const Records all{{"unversioned", "a/b/deep"}, {"unversioned", "top"}};
+    EXPECT_EQ(statesIn(repository / "a/b"), all);
+    EXPECT_EQ(statesIn(repository / ".git/refs"), all);
+}
+
+TEST_F(ShellStatus, ShowsOnlyWhatIsNamed)
+{
+    const GitRepository repository = makeRepository();
+    for (const std::string name : {"a/b/deep", "a/near", "other/file", "top", "bottom"})
+        repository.write(name, "");
+    EXPECT_THAT(statesIn(repository.path(), {"top"}), ElementsAre(Record("unversioned", "top")));
+    EXPECT_THAT(statesIn(repository.path(), {"top", "a"}),
+                ElementsAre(Record("unversioned", "a/b/deep"), Record("unversioned", "a/near"),
+                            Record("unversioned", "top")));
+    EXPECT_THAT(statesIn(repository.path(), {"a/b/", "other", "bottom"}),
+                ElementsAre(Record("unversioned", "a/b/deep"), Record("unversioned", "bottom"),
+                            Record("unversioned", "other/file")));
+    EXPECT_EQ(statesIn(repository.path(), {"."}).size(), 5U);
+}
+
+TEST_F(ShellStatus, TakesANameTwiceForOnce)
+{
+    const GitRepository repository = makeRepository();
+    repository.write("a/file", "");
+    EXPECT_THAT(statesIn(repository.path(), {"a", "a/file", "a/file", "."}),
+                ElementsAre(Record("unversioned", "a/file")));
+}
+
+TEST_F(ShellStatus, TakesNamesFromWhereItIsToWork)
+{
+    const GitRepository repository = makeRepository();
+    for (const std::string name : {"a/b/deep", "a/near", "top"})
+        repository.write(name, "");
+    const Records near{{"unversioned", "a/near"}};
+    EXPECT_EQ(statesIn(repository / "a/b", {"../near"}), near);
+    EXPECT_EQ(statesIn(repository / "a", {(repository / "a/near").string()}), near);
+    for (const std::vector<std::string> &arguments :
+         {std::vector<std::string>{"-C", "repository/a", "status", "near"},
+          {"-C", (repository / "a").string(), "status", "near"},
+          {"-C", "repository", "-C", "a", "-C", "", "status", "near"}})
+    {
+        const CommandResult result = shell(arguments).run();
+        EXPECT_EQ(result.exitStatus, 0);
+        EXPECT_EQ(result.output, "unversioned\ta/near\n");
+    }
+}
+
+TEST_F(ShellStatus, ShowsMissingFilesByNameAndBelowAMissingFolder)
+{
+    GitRepository repository = makeRepository();
+    for (const std::string name : {"gone/a", "gone/b", "single", "here"})
+        repository.write(name, "");
+    repository.commitAll("begin");
+    repository.remove("gone");
+    repository.remove("single");
+    EXPECT_THAT(statesIn(repository.path(), {"gone", "single"}),
+                ElementsAre(Record("missing", "gone/a"), Record("missing", "gone/b"),
+                            Record("missing", "single")));
+    EXPECT_EQ(statesIn(repository.path(), {"gone/"}).size(), 2U);
+    EXPECT_THAT(statesIn(repository.path(), {"gone/b"}), ElementsAre(Record("missing", "gone/b")));
+}
+
+TEST_F(ShellStatus, ShowsNothingForNamesThatNoFileHasAndForIgnoredFiles)
+{
+    const GitRepository repository = makeRepository();
+    repository.write(".gitignore", "ignored\n");
+    repository.write("ignored", "");
+    std::filesystem::create_directory(repository / "empty");
+    EXPECT_THAT(statesIn(repository.path(), {"nothing", "ignored", "empty", "../elsewhere"}),
+                IsEmpty());
+}
+
+TEST_F(ShellStatus, ShowsASubmoduleAsOneEntry)
+{
+    GitRepository inner = makeRepository("inner");
+    inner.write("file", "");
+    inner.commitAll("begin");
+    GitRepository repository = makeRepository();
+    repository.git({"-c", "protocol.file.allow=always", "submodule", "--quiet", "add",
+                    inner.path().string(), "sub"});
+    EXPECT_THAT(statesIn(repository.path(), {"sub"}), ElementsAre(Record("added", "sub")));
+    repository.commitAll("with a submodule");
+    EXPECT_THAT(statesIn(repository.path()),
+                ElementsAre(Record("clean", ".gitmodules"), Record("clean", "sub")));
+}
+
+TEST_F(ShellStatus, ServesALinkedWorkingTree)
+{
+    GitRepository repository = makeRepository();
+    repository.write("file", "");
+    repository.commitAll("begin");
+    repository.git({"worktree", "add", "--quiet", "../linked"});
+    EXPECT_THAT(statesIn(folder() / "linked"), ElementsAre(Record("clean", "file")));
+}
+
+TEST_F(ShellStatus, ShowsNothingForABareRepository)
+{
+    const GitRepository bare = makeRepository("bare");
+    bare.git({"init", "--quiet", "--bare", "."});
+    bare.remove(".git");
+    EXPECT_THAT(statesIn(bare.path()), IsEmpty());
+}
+
+TEST_F(ShellStatus, ShowsThousandsOfFilesAsGitDoes)
+{
+    GitRepository repository = makeRepository();
+    for (int number = 0; number < 3000; ++number)
+        repository.write("folder" + std::to_string(number % 50) + "/file" + std::to_string(number),
+                         "");
+    repository.commitAll("begin");
+    for (int number = 0; number < 3000; number += 100)
+        repository.remove("folder" + std::to_string(number % 50) + "/file" +
+                          std::to_string(number));
+    EXPECT_EQ(asMap(statesIn(repository.path())), gitStates(repository));
+}
+
+} // namespace
+} // namespace vclink::test

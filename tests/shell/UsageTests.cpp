@@ -1,0 +1,89 @@
+// SPDX-License-Identifier: MIT
+#include <gmock/gmock.h>
+
+#include "ShellTest.hpp"
+
+namespace vclink::test
+{
+namespace
+{
+
+using testing::HasSubstr;
+using testing::StartsWith;
+
+class ShellUsage : public ShellTest
+{
+};
+
+TEST_F(ShellUsage, EndsWithTwoAndAReasonWhenTheArgumentsMakeNoSense)
+{
+    const struct
+    {
+        std::vector<std::string> arguments;
+        std::string reason;
+    } cases[] = {
+        {{}, "A command is missing."},
+        {{"-C", "."}, "A command is missing."},
+        {{"comit"}, "There is no command or option \"comit\"."},
+        {{"[status]"}, "There is no command or option \"[status]\"."},
+        {{"--", "status"}, "There is no command or option \"status\"."},
+        {{"--nonsense", "version"}, "\"--nonsense\" was not expected."},
+        {{"status", "--nonsense"}, "\"--nonsense\" was not expected."},
+        {{"version", "7"}, "\"7\" was not expected."},
+        {{"probe"}, "FOLDER is required."},
+        {{"probe", "a", "[b]"}, "\"[b]\" was not expected."},
+        {{"status", ""}, "PATH: it may not be empty."},
+        {{"version", "-C"}, "\"-C\" was not expected."},
+        {{"-C"}, "-C: 1 required FOLDER missing."},
+        {{"--lang"}, "--lang: 1 required LOCALE missing."},
+        {{"--log", "chatter", "version"}, "--log: \"chatter\" is neither a number nor a list"},
+        {{"--log", "parameter,", "version"}, "--log: \"parameter,\" is neither"},
+        {{"--log", "", "version"}, "--log: \"\" is neither"},
+        {{"--log", "0x", "version"}, "--log: \"0x\" is neither"},
+        {{"--log", "0xFFFFFFFFF", "version"}, "--log: \"0xFFFFFFFFF\" is neither"},
+        {{"--log", "-1", "version"}, "--log: \"-1\" is neither"},
+    };
+    for (const auto &[arguments, reason] : cases)
+    {
+        const Command command = shell(arguments);
+        const CommandResult result = command.run();
+        EXPECT_EQ(result.exitStatus, 2) << command.text();
+        EXPECT_EQ(result.output, "") << command.text();
+        EXPECT_THAT(result.errors, StartsWith("vclink-shell: " + reason)) << command.text();
+    }
+}
+
+TEST_F(ShellUsage, ExplainsItselfOnStandardOutput)
+{
+    for (const std::string option : {"--help", "-h"})
+    {
+        const CommandResult result = shell({option}).run();
+        EXPECT_EQ(result.exitStatus, 0);
+        EXPECT_EQ(result.errors, "");
+        for (const std::string word : {"status", "probe", "version", "-C FOLDER",
+                                       "--log SEVERITIES", "--lang LOCALE", "Exit status: 0 done"})
+            EXPECT_THAT(result.output, HasSubstr(word));
+    }
+}
+
+TEST_F(ShellUsage, ExplainsEveryCommandOnStandardOutput)
+{
+    for (const std::string command : {"status", "probe", "version"})
+    {
+        const CommandResult result = shell({command, "--help"}).run();
+        EXPECT_EQ(result.exitStatus, 0);
+        EXPECT_EQ(result.errors, "");
+        EXPECT_THAT(result.output, HasSubstr("Usage: vclink-shell " + command));
+    }
+}
+
+TEST_F(ShellUsage, ExplainsEveryStateInTheHelpOfStatus)
+{
+    const CommandResult result = shell({"status", "--help"}).run();
+    for (const std::string state :
+         {"clean", "modified", "added", "deleted", "missing", "conflict", "unversioned", "unknown"})
+        EXPECT_THAT(result.output, HasSubstr("\n  " + state + " "));
+}
+
+} // namespace
+} // namespace vclink::test
