@@ -1,0 +1,224 @@
+#!/usr/bin/env python3
+# SPDX-License-Identifier: MIT
+"""Compares the library with the floor. Called by scripts/bench, which tells what is measured."""
+
+import argparse
+import concurrent.futures
+import os
+import platform
+import subprocess
+import sys
+
+import working_copies
+from programs import Programs, Ratios
+from report import Table, write_into
+
+SIZES = {1_000: 31, 10_000: 15, 100_000: 7}  # files: rounds of paired runs
+LISTS = (100, 1_000)
+LIST_ROUNDS = 5
+# A list costs libgit2 names times files: callgrind would need an hour for 1,000 of 100,000.
+MOST_COMPARISONS = 10_000_000
+
+FOLDER_RATIO = 1.10
+FOLDER_ALLOCATIONS = 2
+FOLDER_BYTES = 200
+FLATNESS = 1.10
+FILES_RATIO = 1.03
+PROBE_INSTRUCTIONS = 300_000
+LESS_ALLOCATIONS = 0
+
+
+def slope(values):
+    """What each file adds, from the smallest to the largest working copy: {files: value}."""
+    small, large = min(values), max(values)
+    return (values[large] - values[small]) / (large - small)
+
+
+class Bench:
+    def __init__(self, build, scratch, sizes):
+        self._programs = Programs(build, scratch)
+        self._sizes = sizes
+        self._scratch = scratch
+        # Short names, since the root stands in every key of the result.
+        self._roots = {size: os.path.join(scratch, name) for size, name in zip(sizes, "abc")}
+
+    def make_working_copies(self):
+        home = os.path.join(self._scratch, "home")
+        os.mkdir(home)
+        env = working_copies.environment(home)
+        for size, root in self._roots.items():
+            working_copies.make_working_copy(root, size, env)
+            for count in LISTS:
+                working_copies.write_list(self._list(size, count), count, size)
+
+    def _list(self, size, count):
+        return f"{self._roots[size]}.{count}"
+
+    def _lists(self):
+        return [(size, count) for size in self._sizes for count in LISTS
+                if size * count <= MOST_COMPARISONS]
+
+    def count(self):
+        """Counts instructions and allocations; several runs at once, since neither depends on the
+        clock."""
+        programs = self._programs
+        some = self._roots[self._sizes[0]]
+        tasks = {
+            ("less", "instructions"): lambda: programs.instructions(
+                "library", "less", some, self._list(self._sizes[0], 1_000)),
+            ("less", "allocations"): lambda: programs.allocations(
+                "library", "less", some, self._list(self._sizes[0], 1_000)),
+            ("severity", "none"): lambda: programs.instructions("severity", "nothing"),
+            ("severity", "record"): lambda: programs.instructions("severity", "record"),
+            ("severity", "trace"): lambda: programs.instructions("severity", "trace"),
+            ("probe", "floor"): lambda: programs.instructions("floor", "probe", some),
+            ("probe", "guarded"): lambda: programs.instructions("library", "probe", some),
+            ("probe", "alone"): lambda: programs.instructions("library", "probe-alone", some),
+        }
+        for program in ("floor", "library"):
+            for size, count in reversed(self._lists()):
+                arguments = (program, "files", self._roots[size], self._list(size, count))
+                tasks["files", program, size, count] = (
+                    lambda a=arguments: programs.instructions(*a))
+            for size, root in self._roots.items():
+                arguments = (program, "folder", root)
+                tasks["folder", program, size] = lambda a=arguments: programs.instructions(*a)
+                tasks["allocations", program, size] = lambda a=arguments: programs.allocations(*a)
+                tasks["peak", program, size] = lambda a=arguments: programs.run(*a)
+        with concurrent.futures.ThreadPoolExecutor(os.cpu_count()) as pool:
+            running = {key: pool.submit(task) for key, task in tasks.items()}
+            self._counted = {key: task.result() for key, task in running.items()}
+
+    def clock(self):
+        """Times floor, library and git as a child process, nothing else running."""
+        self._rounds = {}
+        for size, root in self._roots.items():
+            self._rounds[size] = self._programs.clock(
+                [("floor", "folder", root), ("library", "folder", root), ("floor", "child", root)],
+                SIZES[size])
+        for size, count in self._lists():
+            arguments = ("files", self._roots[size], self._list(size, count))
+            self._rounds[size, count] = self._programs.clock(
+                [("floor", *arguments), ("library", *arguments)], LIST_ROUNDS)
+
+    def tables(self):
+        return [self._folder_table(), self._files_table(), self._small_table()]
+
+    def _per_file(self, program):
+        return {size: self._counted["folder", program, size] / size for size in self._sizes}
+
+    def _over_floor(self, group, name):
+        return {size: self._counted[group, "library", size][name]
+                - self._counted[group, "floor", size][name] for size in self._sizes}
+
+    def _folder_table(self):
+        table = Table("`getFolderStates`", *(f"{size:,} files" for size in self._sizes))
+        floor, library = self._per_file("floor"), self._per_file("library")
+        table.row("instructions a file, floor", [f"{floor[s]:,.0f}" for s in self._sizes])
+        flatness = max(library.values()) / min(library.values())
+        table.row("instructions a file, library", [f"{library[s]:,.0f}" for s in self._sizes])
+        ratios = [library[size] / floor[size] for size in self._sizes]
+        table.row("library ÷ floor", [f"{ratio:.3f}" for ratio in ratios], FOLDER_RATIO, ratios)
+        blank = [""] * (len(self._sizes) - 1)
+        table.row("largest ÷ smallest cost a file", [*blank, f"{flatness:.3f}"], FLATNESS,
+                  [flatness])
+        for what, name, limit in (("allocations", "allocations", FOLDER_ALLOCATIONS),
+                                  ("bytes asked for", "allocated_bytes", FOLDER_BYTES)):
+            over = self._over_floor("allocations", name)
+            table.row(f"{what} over the floor", [f"{over[s]:,}" for s in self._sizes])
+            table.row(f"{what} over the floor, each further file", [*blank, f"{slope(over):,.2f}"],
+                      limit, [round(slope(over), 6)])
+        held = {s: self._counted["allocations", "library", s]["held_bytes"] for s in self._sizes}
+        table.row("bytes held by the result", [f"{held[s]:,}" for s in self._sizes])
+        for program in ("floor", "library"):
+            table.row(f"peak memory of the process, {program}", [
+                f"{self._counted['peak', program, s]['peak_kib'] / 1024:.1f} MiB"
+                for s in self._sizes])
+        peak = {size: 1024 * kib for size, kib in self._over_floor("peak", "peak_kib").items()}
+        table.row("bytes of peak memory over the floor, each further file",
+                  [*blank, f"{slope(peak):,.0f}"])
+        clocked = [Ratios(self._rounds[size], 1, 0) for size in self._sizes]
+        table.row("time, library ÷ floor", [str(ratio) for ratio in clocked])
+        children = [Ratios(self._rounds[size], 2, 0) for size in self._sizes]
+        table.row("time, `git status --porcelain -uall` as a child process ÷ floor",
+                  [str(ratio) for ratio in children])
+        return table
+
+    def _files_table(self):
+        table = Table("`getFileStates`", "instructions, floor", "library", "library ÷ floor",
+                      "time, library ÷ floor")
+        for size, count in self._lists():
+            floor = self._counted["files", "floor", size, count]
+            library = self._counted["files", "library", size, count]
+            table.row(f"{count:,} of {size:,} files", [
+                f"{floor:,}", f"{library:,}", f"{library / floor:.4f}",
+                str(Ratios(self._rounds[size, count], 1, 0))],
+                FILES_RATIO, [library / floor])
+        return table
+
+    def _small_table(self):
+        counted = self._counted
+        table = Table("One call", "Measured")
+        less = counted["less", "allocations"]
+        table.row("`std::less<upath>`, allocations of 999 calls", [f"{less['allocations']}"],
+                  LESS_ALLOCATIONS, [less["allocations"]])
+        table.row("`std::less<upath>` of neighbours in a folder or not, instructions",
+                  [f"{counted['less', 'instructions'] / less['entries']:.0f}"])
+        table.row("`isAdapterFor` with a guard alive, instructions",
+                  [f"{counted['probe', 'guarded']:,}"], PROBE_INSTRUCTIONS,
+                  [counted["probe", "guarded"]])
+        table.row("the same at the floor", [f"{counted['probe', 'floor']:,}"])
+        table.row("`isAdapterFor` without a guard, instructions",
+                  [f"{counted['probe', 'alone']:,}"])
+        for what, name in (("log record", "record"), ("scope trace", "trace")):
+            each = (counted["severity", name] - counted["severity", "none"]) / 100_000
+            table.row(f"disabled {what}, instructions", [f"{each:.1f}"])
+        return table
+
+
+def first_line(*command):
+    return subprocess.run(command, capture_output=True, text=True,
+                          check=True).stdout.splitlines()[0]
+
+
+def describe(root_length):
+    libgit2 = first_line("pkg-config", "--modversion", "libgit2")
+    compiler = first_line("g++", "-dumpfullversion")
+    git = first_line("git", "--version").split()[-1]
+    return (f"libgit2 {libgit2}, gcc {compiler}, git {git}, {platform.machine()}. Paths of 40 "
+            f"characters below a root of {root_length}, all files clean. Instructions and "
+            f"allocations are those of the call; times are ratios of runs in turn, the median "
+            f"(smallest–largest).")
+
+
+def parse():
+    parser = argparse.ArgumentParser(description=__doc__)
+    parser.add_argument("--build", required=True, help="the build folder")
+    parser.add_argument("--scratch", required=True, help="an empty folder with a short name")
+    parser.add_argument("--quick", action="store_true", help="without the largest working copy")
+    parser.add_argument("--readme", help="file to write the tables into")
+    return parser.parse_args()
+
+
+def main():
+    options = parse()
+    sizes = list(SIZES)[:2] if options.quick else list(SIZES)
+    bench = Bench(options.build, options.scratch, sizes)
+    for what, step in (("making working copies", bench.make_working_copies),
+                       ("counting instructions and allocations", bench.count),
+                       ("timing", bench.clock)):
+        print(f"== {what}", file=sys.stderr, flush=True)
+        step()
+    tables = bench.tables()
+    text = "\n\n".join([describe(len(options.scratch) + 2), *map(str, tables)])
+    print(text)
+    if options.readme:
+        write_into(options.readme, text)
+    failed = [what for table in tables for what in table.failed]
+    print(f"\nbench: {'over the limit: ' + '; '.join(failed) if failed else 'within all limits'}",
+          file=sys.stderr)
+    return 1 if failed else 0
+
+
+if __name__ == "__main__":
+    sys.exit(main())

@@ -1,0 +1,66 @@
+# SPDX-License-Identifier: MIT
+"""Runs the measured programs and reads what they say."""
+
+import os
+import statistics
+import subprocess
+
+import working_copies
+
+
+class Programs:
+    """The programs of one build, in one environment. Each run gives what its measured region gave,
+    by name."""
+
+    def __init__(self, build, scratch):
+        self._build = os.path.join(build, "bench")
+        self._scratch = scratch
+        self._env = working_copies.environment(os.path.join(scratch, "home"))
+
+    def run(self, program, *arguments, wrapper=(), env=None):
+        command = [*wrapper, os.path.join(self._build, f"vclink_bench_{program}"), *arguments]
+        done = subprocess.run(command, env=env or self._env, capture_output=True, text=True)
+        if done.returncode != 0:
+            raise SystemExit(f"bench: {' '.join(command)} failed:\n{done.stderr}")
+        pairs = (line.split() for line in done.stdout.splitlines())
+        return {name: int(value) for name, value in pairs}
+
+    def instructions(self, program, *arguments):
+        """How many instructions callgrind counts in the region."""
+        name = "-".join([program, *arguments]).replace("/", "_")
+        counts = os.path.join(self._scratch, f"callgrind{name}")
+        self.run(program, *arguments, wrapper=[
+            "valgrind", "--tool=callgrind", "--instr-atstart=no", f"--callgrind-out-file={counts}"])
+        with open(counts, encoding="utf-8") as file:
+            totals = [line for line in file if line.startswith("totals:")]
+        os.remove(counts)
+        return int(totals[0].split()[1])
+
+    def allocations(self, program, *arguments):
+        """What the region allocates, as the preloaded library counts it."""
+        library = os.path.join(self._build, "libvclink_bench_allocations.so")
+        return self.run(program, *arguments, env={**self._env, "LD_PRELOAD": library})
+
+    def clock(self, commands, rounds):
+        """Runs all commands once a round, each second round backwards, after one round for the
+        system's caches. Gives the rounds: the times in the order of the commands."""
+        times = []
+        for number in range(rounds + 1):
+            order = list(enumerate(commands))
+            taken = {place: self.run(*command)["nanoseconds"]
+                     for place, command in (reversed(order) if number % 2 else order)}
+            times.append([taken[place] for place in range(len(commands))])
+        return times[1:]
+
+
+class Ratios:
+    """Ratios of paired times: median, smallest, largest."""
+
+    def __init__(self, rounds, above, below):
+        ratios = sorted(times[above] / times[below] for times in rounds)
+        self.median = statistics.median(ratios)
+        self.smallest = ratios[0]
+        self.largest = ratios[-1]
+
+    def __str__(self):
+        return f"{self.median:.2f} ({self.smallest:.2f}–{self.largest:.2f})"

@@ -1,0 +1,74 @@
+// SPDX-License-Identifier: MIT
+#define _GNU_SOURCE
+#include "bench/region.h"
+
+#include <dlfcn.h>
+#include <stdio.h>
+#include <stdlib.h>
+#include <string.h>
+#include <time.h>
+
+#include <valgrind/callgrind.h>
+
+#include "bench/allocations.h"
+
+static struct AllocationCounts *counts;
+static struct timespec started;
+static struct timespec ended;
+
+void beginRegion(void)
+{
+    counts = dlsym(RTLD_DEFAULT, VCLINK_BENCH_ALLOCATION_COUNTS);
+    if (counts != NULL)
+    {
+        counts->enabled = 1;
+    }
+    clock_gettime(CLOCK_MONOTONIC, &started);
+    CALLGRIND_START_INSTRUMENTATION;
+}
+
+void endRegion(void)
+{
+    CALLGRIND_STOP_INSTRUMENTATION;
+    clock_gettime(CLOCK_MONOTONIC, &ended);
+    if (counts != NULL)
+    {
+        counts->enabled = 0;
+    }
+}
+
+/// The most memory that this program has had in use. getrusage would count what its parent had
+/// before exec, too.
+static long readPeakKib(void)
+{
+    long kib = -1;
+    char line[256];
+    FILE *const status = fopen("/proc/self/status", "r");
+    while (status != NULL && fgets(line, sizeof line, status) != NULL)
+    {
+        if (strncmp(line, "VmHWM:", 6) == 0)
+        {
+            kib = strtol(line + 6, NULL, 10);
+        }
+    }
+    if (status != NULL)
+    {
+        fclose(status);
+    }
+    return kib;
+}
+
+void printRegion(size_t entries)
+{
+    printf("entries %zu\n", entries);
+    printf("nanoseconds %lld\n", (long long)(ended.tv_sec - started.tv_sec) * 1000000000 +
+                                     (ended.tv_nsec - started.tv_nsec));
+    printf("peak_kib %ld\n", readPeakKib());
+    if (counts != NULL)
+    {
+        printf("allocations %zu\n", counts->allocations);
+        printf("allocated_bytes %zu\n", counts->allocatedBytes);
+        printf("held_bytes %lld\n",
+               (long long)counts->allocatedBytes - (long long)counts->freedBytes);
+    }
+}

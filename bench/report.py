@@ -1,0 +1,47 @@
+# SPDX-License-Identifier: MIT
+"""The table of results, its limits and verdicts, and its place in the README."""
+
+import sys
+
+BEGIN = "<!-- bench:begin -->"
+END = "<!-- bench:end -->"
+
+
+def show(limit):
+    if limit is None:
+        return ""
+    return f"≤ {limit:,}" if isinstance(limit, int) else f"≤ {limit:.2f}"
+
+
+class Table:
+    def __init__(self, *columns):
+        self._columns = columns
+        self._rows = []
+        self.failed = []
+
+    def row(self, what, values, limit=None, measured=()):
+        """One row. With a limit, each number of `measured` must not be above it."""
+        verdict = ""
+        if limit is not None:
+            passed = all(number <= limit for number in measured)
+            verdict = "pass" if passed else "**fail**"
+            if not passed:
+                self.failed.append(what)
+        self._rows.append([what, *values, show(limit), verdict])
+
+    def __str__(self):
+        header = [*self._columns, "Limit", "Verdict"]
+        rule = ["---", *["---:"] * (len(header) - 2), "---"]
+        return "\n".join(f"| {' | '.join(cells)} |" for cells in [header, rule, *self._rows])
+
+
+def write_into(readme, text):
+    """Puts the text between the README's markers."""
+    with open(readme, encoding="utf-8") as file:
+        content = file.read()
+    if content.count(BEGIN) != 1 or content.count(END) != 1:
+        sys.exit(f"bench: {readme} does not have the two markers of the table once each")
+    before, rest = content.split(BEGIN)
+    after = rest.split(END)[1]
+    with open(readme, "w", encoding="utf-8") as file:
+        file.write(f"{before}{BEGIN}\n{text}\n{END}{after}")

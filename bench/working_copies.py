@@ -1,0 +1,61 @@
+# SPDX-License-Identifier: MIT
+"""Makes the working copies that are measured, and lists of files in them."""
+
+import os
+import subprocess
+import time
+
+# What git and libgit2 read of the person's own set-up, kept away from both.
+HERMETIC = {
+    "GIT_AUTHOR_NAME": "bench",
+    "GIT_AUTHOR_EMAIL": "bench@localhost",
+    "GIT_COMMITTER_NAME": "bench",
+    "GIT_COMMITTER_EMAIL": "bench@localhost",
+    "GIT_CONFIG_NOSYSTEM": "1",
+    "LC_ALL": "C.UTF-8",
+}
+
+
+def environment(home):
+    """The environment in which all programs run, HOME and XDG folders being an empty folder."""
+    inherited = {name: os.environ[name] for name in ("PATH", "TMPDIR") if name in os.environ}
+    return {**inherited, **HERMETIC, "HOME": home, "XDG_CONFIG_HOME": home, "LD_BIND_NOW": "1"}
+
+
+def name_of(number):
+    """A path of 40 characters; 20 files a folder, 10 such folders in the folder above."""
+    return f"source/module-{number // 200:03d}/section-{number // 20 % 10:02d}/f-{number:05d}.cpp"
+
+
+def export_stream(count):
+    """What git fast-import takes: one commit of so many small files."""
+    yield b"commit refs/heads/main\ncommitter bench <bench@localhost> 1700000000 +0000\n"
+    yield b"data 5\nfiles\n"
+    for number in range(count):
+        content = b"int value%d();\n" % number
+        yield b"M 100644 inline %s\ndata %d\n%s\n" % (
+            name_of(number).encode(), len(content), content)
+
+
+def git(root, env, *arguments, **options):
+    subprocess.run(["git", "-C", root, *arguments], env=env, check=True, **options)
+
+
+def make_working_copy(root, count, env):
+    """A clean working copy. Its files are older than its index, so that a walk trusts the index's
+    file times and reads no content."""
+    subprocess.run(["git", "init", "--quiet", "--initial-branch=main", root], env=env, check=True)
+    git(root, env, "fast-import", "--quiet", input=b"".join(export_stream(count)))
+    git(root, env, "read-tree", "HEAD")
+    git(root, env, "checkout-index", "--all", "--force")
+    past = time.time() - 3600
+    for number in range(count):
+        os.utime(os.path.join(root, name_of(number)), (past, past))
+    git(root, env, "update-index", "--refresh")
+
+
+def write_list(path, count, of):
+    """Lists `count` files of a working copy of `of` files, spread evenly over it."""
+    with open(path, "w", encoding="ascii") as file:
+        for number in range(count):
+            file.write(name_of(number * of // count) + "\n")
