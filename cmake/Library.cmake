@@ -21,4 +21,6 @@ set_target_properties(vclink_git PROPERTIES
     VERSION ${PROJECT_VERSION}
     SOVERSION ${PROJECT_VERSION_MAJOR}
     LIBRARY_OUTPUT_DIRECTORY "${VCLINK_STAGE_DIR}/${CMAKE_INSTALL_LIBDIR}")
-target_link_options(vclink_git PRIVATE -Wl,--as-needed -Wl,--no-undefined)
+# clang's sanitizers leave their names to be found in the program.
+target_link_options(vclink_git PRIVATE
+    -Wl,--as-needed $<$<NOT:$<BOOL:${VCLINK_SANITIZE}>>:-Wl,--no-undefined>)

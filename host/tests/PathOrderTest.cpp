@@ -8,7 +8,7 @@
 #include "vclink/FileStateMap.hpp"
 
 using fl::i18n::to_string;
-using vclink_host_tests::isLessByElements;
+using vclink_host_tests::listElements;
 using vclink_host_tests::makeRandomPaths;
 
 namespace
@@ -56,13 +56,24 @@ TEST(PathOrder, TakesNoNoticeOfTheNativeForm)
 
 TEST(PathOrder, AgreesWithTheWalkOverTheElements)
 {
-    const auto paths = makeRandomPaths(1, 1500);
-    for (const ustring &left : paths)
+    struct Walked
     {
-        for (const ustring &right : paths)
+        upath path;
+        std::vector<ustring> elements;
+    };
+    std::vector<Walked> walked;
+    for (const ustring &text : makeRandomPaths(1, 1000))
+    {
+        walked.push_back({upath(text), listElements(text)});
+    }
+    const auto less = vclink::FileStateMap().key_comp();
+    for (const Walked &left : walked)
+    {
+        for (const Walked &right : walked)
         {
-            ASSERT_EQ(isLess(left, right), isLessByElements(left, right))
-                << '"' << to_string(left) << "\" \"" << to_string(right) << '"';
+            ASSERT_EQ(less(left.path, right.path), left.elements < right.elements)
+                << '"' << to_string(left.path.string()) << "\" \"" << to_string(right.path.string())
+                << '"';
         }
     }
 }

@@ -26,12 +26,6 @@ inline std::vector<ustring> listElements(const ustring &path)
     return elements;
 }
 
-/// The order of paths in the most direct way.
-inline bool isLessByElements(const ustring &left, const ustring &right)
-{
-    return listElements(left) < listElements(right);
-}
-
 /// Short paths of few letters, so that they often share parts; with leading, doubled and trailing
 /// slashes, characters on both sides of the slash, a surrogate and a unit above the surrogates.
 inline std::vector<ustring> makeRandomPaths(unsigned seed, std::size_t count)
