@@ -50,7 +50,7 @@ void RandomWorkingCopy::edit(const std::string &path)
     }
     if (maker_.isLink(path))
     {
-        return maker_.link(makeLinkTarget(), path);
+        return maker_.link(makeLinkTarget(path), path);
     }
     if (kind == 5)
     {
@@ -77,7 +77,7 @@ void RandomWorkingCopy::changeType(const std::string &path)
     }
     else
     {
-        maker_.link(makeLinkTarget(), path);
+        maker_.link(makeLinkTarget(path), path);
     }
 }
 
@@ -129,7 +129,7 @@ void RandomWorkingCopy::addUntracked()
         switch (random_.below(8))
         {
         case 0:
-            maker_.link(makeLinkTarget(), path);
+            maker_.link(makeLinkTarget(path), path);
             break;
         case 1:
             maker_.makeFolder(path);

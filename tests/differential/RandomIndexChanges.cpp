@@ -65,7 +65,7 @@ void RandomWorkingCopy::stageEdit(const std::string &path)
 {
     if (maker_.isLink(path))
     {
-        maker_.link(makeLinkTarget(), path);
+        maker_.link(makeLinkTarget(path), path);
     }
     else if (random_.chance(30))
     {
@@ -190,7 +190,7 @@ void RandomWorkingCopy::addFiles()
         }
         if (random_.chance(15))
         {
-            maker_.link(makeLinkTarget(), path);
+            maker_.link(makeLinkTarget(path), path);
         }
         else
         {

@@ -23,10 +23,8 @@ const Forms unusualFiles{
     "[", "{a,b}%", "back\\%", "\\#%", "%\\", "#%", "#%#", "!%", "!", "#", "~%", "-%", "--%", ":%",
     ":(top)%", "..%", "%..", "@%", "a=b%", "%%",
     // text outside ASCII: composed, decomposed, outside the first plane, with a byte order mark
-    "\xC3\xBC"
-    "bung%",
-    "\xE6\x97\xA5\xE6\x9C\xAC%", "\xF0\x9D\x92\xB3%", "e\xCC\x81%", "\xEF\xBB\xBF%",
-    "\xEF\xBF\xBD%",
+    "\xC3\xBCmlaut%", "\xE6\x97\xA5\xE6\x9C\xAC%", "\xF0\x9D\x92\xB3%", "e\xCC\x81%",
+    "\xEF\xBB\xBF%", "\xEF\xBF\xBD%",
     // bytes that are no UTF-8: stray, cut short, Latin-1, overlong, an encoded surrogate
     "\xFF%", "\x80%", "%\xE6\x97", "caf\xE9%", "\xC0\xAF%", "\xED\xA0\x80%",
     // control characters

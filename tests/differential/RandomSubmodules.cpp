@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: MIT
 #include "RandomWorkingCopy.hpp"
+
 #include "quoting.hpp"
 
 namespace vclink::test
@@ -69,7 +70,7 @@ void RandomWorkingCopy::changeSubmodule(const std::string &path)
     {
         return;
     }
-    switch (random_.below(8))
+    switch (random_.below(6))
     {
     case 0:
         return maker_.write(path + "/inner/file", "three\n");

@@ -13,16 +13,22 @@ constexpr std::size_t blobsAside = 12;
 
 } // namespace
 
-std::string RandomWorkingCopy::makeLinkTarget()
+std::string RandomWorkingCopy::makeLinkTarget(const std::string &link)
 {
     static const std::vector<std::string> others{".",      "missing", "/nowhere/at all", "..",
                                                  "\xFF/a", "loop",    "../outside"};
+    std::string up;
+    for (auto depth = std::count(link.begin(), link.end(), '/'); depth > 0; --depth)
+    {
+        up += "../";
+    }
     const std::string folder = names_.someFolder();
     if (random_.chance(40) && !folder.empty())
     {
-        return folder;
+        return up + folder;
     }
-    return tracked_.empty() || random_.chance(50) ? random_.pick(others) : random_.pick(tracked_);
+    return tracked_.empty() || random_.chance(40) ? random_.pick(others)
+                                                  : up + random_.pick(tracked_);
 }
 
 PlannedFile RandomWorkingCopy::planFile(const std::vector<PlannedFile> &before)
@@ -31,10 +37,9 @@ PlannedFile RandomWorkingCopy::planFile(const std::vector<PlannedFile> &before)
     if (random_.chance(12))
     {
         file.mode = "120000";
-        file.content = makeLinkTarget();
+        file.content = makeLinkTarget(file.path);
     }
-    else if (duplicates_ && !before.empty() && random_.chance(40) &&
-             before.back().mode.front() == '1' && before.back().mode[1] == '0')
+    else if (duplicates_ && !before.empty() && random_.chance(40) && before.back().mode != "120000")
     {
         file.content = before.back().content;
     }
@@ -55,8 +60,9 @@ void RandomWorkingCopy::commitTree(std::size_t files)
     }
     if (random_.chance(35))
     {
-        tree.push_back({".gitignore", "100644", makeIgnoreRules(random_)});
-        tracked_.push_back(".gitignore");
+        const PlannedFile rules{".gitignore", "100644", makeIgnoreRules(random_)};
+        tree.push_back(rules);
+        tracked_.push_back(rules.path);
     }
     if (random_.chance(20))
     {

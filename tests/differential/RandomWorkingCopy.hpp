@@ -48,7 +48,7 @@ class RandomWorkingCopy
     // RandomTree.cpp: what HEAD holds
     void commitTree(std::size_t files);
     PlannedFile planFile(const std::vector<PlannedFile> &before);
-    std::string makeLinkTarget();
+    std::string makeLinkTarget(const std::string &link);
     void fillUnbornBranch(std::size_t files);
 
     // RandomIndexChanges.cpp: staged changes, one a path at most

@@ -1,8 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "expectedStates.hpp"
 
-#include <algorithm>
-#include <tuple>
+#include <vector>
 
 #include "moves.hpp"
 
