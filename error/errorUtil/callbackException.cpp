@@ -4,11 +4,11 @@
 #include <memory>
 #include <utility>
 
-#include <boost/exception/diagnostic_information.hpp>
 #include <boost/thread/tss.hpp>
 #include <git2/errors.h>
 
 #include "computils/exception/getStackTraceReport.hpp"
+#include "error/errorUtil/diagnosticText.hpp"
 #include "error/logging/logger.hpp"
 #include "fl/i18n/convert.hpp"
 
@@ -54,8 +54,7 @@ int callbackErrorCode() noexcept
 
 void reportCallbackException()
 {
-    writeRecord(SeverityException, "Exception caught: ",
-                [] { return boost::current_exception_diagnostic_information(true); });
+    writeRecord(SeverityException, "Exception caught: ", currentDiagnosticText);
     writeRecord(SeverityStackTrace,
                 [] { return fl::i18n::to_string(computils::exception::getStackTraceReport()); });
 }

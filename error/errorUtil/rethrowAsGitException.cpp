@@ -3,8 +3,7 @@
 
 #include <exception>
 
-#include <boost/exception/diagnostic_information.hpp>
-
+#include "error/errorUtil/diagnosticText.hpp"
 #include "error/logging/logger.hpp"
 #include "fl/i18n/convert.hpp"
 #include "foundation/core/except/IUserException.hpp"
@@ -36,8 +35,7 @@ ustring textOfCurrentException()
 
 void rethrowAsGitException(const resource_core::BaseMsgID &id)
 {
-    writeRecord(SeverityException, "Exception caught: ",
-                [] { return boost::current_exception_diagnostic_information(true); });
+    writeRecord(SeverityException, "Exception caught: ", currentDiagnosticText);
     throw GitException(id, textOfCurrentException());
 }
 

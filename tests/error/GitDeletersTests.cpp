@@ -36,25 +36,25 @@ template <class Handle> void noteAndForward(const char *name, Handle *handle)
 } // namespace
 
 // This program's own definitions go before libgit2's, which they note and call.
-#define NOTE_RELEASES_OF(Handle)                                                                   \
-    extern "C" void Handle##_free(Handle *handle)                                                  \
+#define NOTE_RELEASES(function, Pointer)                                                           \
+    extern "C" void function(Pointer handle)                                                       \
     {                                                                                              \
-        noteAndForward(#Handle "_free", handle);                                                   \
+        noteAndForward(#function, handle);                                                         \
     }
-NOTE_RELEASES_OF(git_annotated_commit)
-NOTE_RELEASES_OF(git_branch_iterator)
-NOTE_RELEASES_OF(git_commit)
-NOTE_RELEASES_OF(git_config)
-NOTE_RELEASES_OF(git_index)
-NOTE_RELEASES_OF(git_index_conflict_iterator)
-NOTE_RELEASES_OF(git_object)
-NOTE_RELEASES_OF(git_odb)
-NOTE_RELEASES_OF(git_odb_object)
-NOTE_RELEASES_OF(git_reference)
-NOTE_RELEASES_OF(git_remote)
-NOTE_RELEASES_OF(git_repository)
-NOTE_RELEASES_OF(git_signature)
-NOTE_RELEASES_OF(git_tree)
+NOTE_RELEASES(git_annotated_commit_free, git_annotated_commit *)
+NOTE_RELEASES(git_branch_iterator_free, git_branch_iterator *)
+NOTE_RELEASES(git_commit_free, git_commit *)
+NOTE_RELEASES(git_config_free, git_config *)
+NOTE_RELEASES(git_index_free, git_index *)
+NOTE_RELEASES(git_index_conflict_iterator_free, git_index_conflict_iterator *)
+NOTE_RELEASES(git_object_free, git_object *)
+NOTE_RELEASES(git_odb_free, git_odb *)
+NOTE_RELEASES(git_odb_object_free, git_odb_object *)
+NOTE_RELEASES(git_reference_free, git_reference *)
+NOTE_RELEASES(git_remote_free, git_remote *)
+NOTE_RELEASES(git_repository_free, git_repository *)
+NOTE_RELEASES(git_signature_free, git_signature *)
+NOTE_RELEASES(git_tree_free, git_tree *)
 
 namespace vclink::git
 {

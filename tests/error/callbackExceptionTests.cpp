@@ -6,6 +6,7 @@
 #include <stdexcept>
 #include <string>
 #include <utility>
+#include <vector>
 
 #include <boost/exception/diagnostic_information.hpp>
 #include <git2/errors.h>
@@ -15,6 +16,8 @@
 #include "error/logging/severity.hpp"
 #include "fl/i18n/convert.hpp"
 #include "support/LogCapture.hpp"
+#include "vclink/git/GitException.hpp"
+#include "vclink/git/messageIdentifiers.hpp"
 #include "vclink/util/exception/CancelledOperationException.hpp"
 
 namespace vclink::git
@@ -138,6 +141,25 @@ TEST_F(CallbackException, IsReportedAtEachSeverityByItself)
         ASSERT_EQ(records.size(), 1u);
         EXPECT_EQ(records[0].severity, severity);
     }
+}
+
+TEST_F(CallbackException, ThatReportsItsStackForItsTextDoesSoBeforeItsOwnRecord)
+{
+    const LogCapture log;
+    try
+    {
+        throw GitException(shared_vclink::git::HasConflicts());
+    }
+    catch (const GitException &)
+    {
+        reportCallbackException();
+    }
+    std::vector<unsigned> severities;
+    for (const auto &record : log.records())
+    {
+        severities.push_back(record.severity);
+    }
+    EXPECT_THAT(severities, testing::ElementsAre(0x200u, 0x10u, 0x200u));
 }
 
 TEST_F(CallbackException, IsReportedNowhereWhenNothingIsEnabled)

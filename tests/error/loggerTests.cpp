@@ -193,14 +193,15 @@ TEST(Logger, OpensNoRecordWhenLoggingIsSwitchedOff)
 
 TEST(Logger, MayBeWrittenToWhileATextIsBuilt)
 {
-    const LogCapture log(SeverityDiagnostic);
+    const LogCapture log(SeverityDiagnostic | SeverityStackTrace);
     writeRecord(SeverityDiagnostic,
                 []
                 {
-                    writeRecord(SeverityDiagnostic, "inner");
+                    writeRecord(SeverityStackTrace, "inner");
                     return "outer";
                 });
     EXPECT_THAT(log.messages(), ElementsAre("inner", "outer"));
+    EXPECT_THAT(log.messages(SeverityDiagnostic), ElementsAre("outer"));
 }
 
 } // namespace

@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "error/raiser.hpp"
 
-#include "../../error/raise.hpp"
+#include "error/raise.hpp"
 #include "vclink/git/messageIdentifiers.hpp"
 
 namespace vclink::test

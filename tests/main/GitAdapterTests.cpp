@@ -3,11 +3,14 @@
 #include <string>
 #include <type_traits>
 #include <utility>
+#include <vector>
 
 #include <git2.h>
+#include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include "AdapterTest.hpp"
+#include "TestOptionsFactory.hpp"
 #include "support/Descriptors.hpp"
 #include "support/text.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
@@ -17,10 +20,10 @@ namespace
 
 using vclink::ApplicationInteractor;
 using vclink::git::GitAdapter;
-using vclink::git::GitOptionsFactory;
 using vclink::git::LibGit2Exception;
 using vclink::test::asPath;
 using vclink::test::asUtf8;
+using vclink::test::TestOptionsFactory;
 
 int countStarts()
 {
@@ -28,65 +31,6 @@ int countStarts()
     git_libgit2_shutdown();
     return count;
 }
-
-/// What stood when a factory was destroyed.
-struct Testimony
-{
-    int starts = -1;
-    long interactorShares = -1;
-};
-
-/// A host's own factory, which looks around when it goes.
-class WatchingFactory : public GitOptionsFactory
-{
-  public:
-    WatchingFactory(std::shared_ptr<ApplicationInteractor> interactor, Testimony &testimony)
-        : GitOptionsFactory(std::move(interactor)), testimony_(testimony)
-    {
-    }
-    ~WatchingFactory() override
-    {
-        testimony_.starts = countStarts();
-        testimony_.interactorShares = getInteractor().use_count() - 1;
-    }
-    vclink::git::CloneOptions makeCloneOptions() override
-    {
-        return {};
-    }
-    vclink::git::FetchOptions makeFetchOptions() override
-    {
-        return {};
-    }
-    vclink::git::ProxyOptions makeProxyOptions() override
-    {
-        return {};
-    }
-    vclink::git::PushOptions makePushOptions() override
-    {
-        return {};
-    }
-    vclink::git::CheckoutOptions makeCheckoutOptions() override
-    {
-        return {};
-    }
-    vclink::git::StatusOptions makeStatusOptions() override
-    {
-        ++statusOptionsMade;
-        sharesWhileMaking = shares.use_count();
-        return {};
-    }
-    vclink::git::MergeOptions makeMergeOptions() override
-    {
-        return {};
-    }
-
-    int statusOptionsMade = 0;
-    std::weak_ptr<GitOptionsFactory> shares;
-    long sharesWhileMaking = 0;
-
-  private:
-    Testimony &testimony_;
-};
 
 class GitAdapterTest : public vclink::test::AdapterTest
 {
@@ -159,8 +103,7 @@ TEST_F(GitAdapterTest, RaisesWhereItsRepositoryCannotBeOpened)
 
 TEST_F(GitAdapterTest, SharesTheFactoryAndTheInteractor)
 {
-    Testimony testimony;
-    const auto factory = std::make_shared<WatchingFactory>(interactor_, testimony);
+    const auto factory = std::make_shared<TestOptionsFactory>(interactor_);
     const GitAdapter adapter(asPath(folder().path()), factory);
     EXPECT_EQ(factory.use_count(), 2);
     const auto share = adapter.getOptionsFactory();
@@ -193,18 +136,15 @@ TEST_F(GitAdapterTest, OwnsOneObjectOfCallbacks)
 TEST_F(GitAdapterTest, AsksTheFactoryForTheOptionsOfEachWalk)
 {
     const auto repository = makeRepository();
-    Testimony testimony;
-    const auto factory = std::make_shared<WatchingFactory>(interactor_, testimony);
-    factory->shares = factory;
+    const auto factory = std::make_shared<TestOptionsFactory>(interactor_);
+    std::vector<long> shares;
+    factory->onStatusOptions = [&] { shares.push_back(factory.use_count()); };
     GitAdapter adapter(asPath(repository.path()), factory);
     adapter.getFileStates({});
-    EXPECT_EQ(factory->statusOptionsMade, 0);
     adapter.getFileStates({asPath(repository / "file")});
-    EXPECT_EQ(factory->statusOptionsMade, 1);
-    // Besides the test's and the adapter's, the walk holds a share.
-    EXPECT_EQ(factory->sharesWhileMaking, 3);
     adapter.getFolderStates(adapter.getRootFolder());
-    EXPECT_EQ(factory->statusOptionsMade, 2);
+    // Besides the test's and the adapter's, the walk holds a share.
+    EXPECT_THAT(shares, testing::ElementsAre(3, 3));
     EXPECT_EQ(factory.use_count(), 2);
 }
 
@@ -212,15 +152,22 @@ TEST_F(GitAdapterTest, AsksTheFactoryForTheOptionsOfEachWalk)
 TEST_F(GitAdapterTest, EndsTheGuardLast)
 {
     const int before = countStarts();
-    Testimony testimony;
-    std::shared_ptr<ApplicationInteractor> interactor =
-        std::make_shared<vclink::test::TestInteractor>();
-    auto adapter = std::make_unique<GitAdapter>(
-        asPath(folder().path()),
-        std::make_shared<WatchingFactory>(std::move(interactor), testimony));
+    int startsAtTheFactorysEnd = 0;
+    long sharesAtTheFactorysEnd = 0;
+    auto interactor = std::make_shared<vclink::test::TestInteractor>();
+    auto factory = std::make_shared<TestOptionsFactory>(interactor);
+    factory->onDestruction = [&, watched = std::weak_ptr<ApplicationInteractor>(interactor)]
+    {
+        startsAtTheFactorysEnd = countStarts();
+        sharesAtTheFactorysEnd = watched.use_count();
+    };
+    auto adapter = std::make_unique<GitAdapter>(asPath(folder().path()), std::move(factory));
+    EXPECT_EQ(interactor.use_count(), 4);
+    interactor.reset();
     adapter.reset();
-    EXPECT_EQ(testimony.starts, before + 1);
-    EXPECT_EQ(testimony.interactorShares, 1);
+    EXPECT_EQ(startsAtTheFactorysEnd, before + 1);
+    // Its own.
+    EXPECT_EQ(sharesAtTheFactorysEnd, 1);
     EXPECT_EQ(countStarts(), before);
 }
 

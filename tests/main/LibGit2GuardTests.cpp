@@ -127,6 +127,21 @@ TEST_F(LibGit2GuardTest, LetsAnExceptionOfAProbeTellItsTextAfterTheEnd)
     }
 }
 
+TEST_F(LibGit2GuardTest, LetsAGeneratorThatIsNotAvailableSaySo)
+{
+    const auto interactor = std::make_shared<vclink::test::TestInteractor>();
+    try
+    {
+        GitAdapterFactory().createWorkingCopyGenerator(interactor);
+        FAIL() << "no exception";
+    }
+    catch (const LibGit2Exception &exception)
+    {
+        EXPECT_EQ(exception.getError().getMessage(), u"not available in this build");
+    }
+    EXPECT_EQ(countStarts(), before_);
+}
+
 TEST_F(LibGit2GuardTest, KeepsAnAdapterWorkingWhenAProbeHasEnded)
 {
     const auto repository = makeRepository();

@@ -105,12 +105,29 @@ TEST_F(StatusFailure, OfAFormatThatLibGit2DoesNotKnowIsRaised)
     const auto sha256 = folder() / "sha256";
     repository_.git({"init", "--quiet", "--object-format=sha256", sha256.string()});
     EXPECT_EQ(raisedBy(*makeAdapter(sha256)), GIT_ERROR);
+    const auto extended = makeRepository("extended");
+    extended.git({"config", "core.repositoryFormatVersion", "1"});
+    extended.git({"config", "extensions.worktreeConfig", "true"});
+    EXPECT_EQ(raisedBy(*makeAdapter(extended.path())), GIT_ERROR);
 }
 
 /// A format that only the walk meets.
 TEST_F(StatusFailure, OfASplitIndexGivesAnEmptyMap)
 {
     repository_.git({"update-index", "--split-index"});
+    EXPECT_EQ(allStates(repository_), States());
+}
+
+TEST_F(StatusFailure, OfASparseIndexGivesAnEmptyMap)
+{
+    repository_.write("sub/inside", "x");
+    repository_.commitAll("second");
+    repository_.git({"config", "index.sparse", "true"});
+    repository_.git({"config", "core.sparseCheckoutCone", "true"});
+    repository_.git({"config", "core.sparseCheckout", "true"});
+    repository_.write(".git/info/sparse-checkout", "/*\n!/*/\n");
+    repository_.git({"read-tree", "-mu", "HEAD"});
+    ASSERT_NE(repository_.git({"ls-files", "--sparse"}).find("sub/\n"), std::string::npos);
     EXPECT_EQ(allStates(repository_), States());
 }
 

@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: MIT
 #include <exception>
+#include <functional>
 #include <memory>
 #include <stdexcept>
 #include <string>
@@ -10,6 +11,7 @@
 
 #include "AdapterTest.hpp"
 #include "LibGit2Calls.hpp"
+#include "TestOptionsFactory.hpp"
 #include "error/errorUtil/GitErrorPolicy.hpp"
 #include "error/errorUtil/GitResult.hpp"
 #include "error/errorUtil/callbackException.hpp"
@@ -103,6 +105,19 @@ TEST_F(StatusWalk, OpensAfterTheOptionsAndReleasesAtTheEnd)
     EXPECT_EQ(query(), fourStates);
     EXPECT_THAT(calls_.names, ElementsAre("git_status_options_init", "git_repository_open_ext",
                                           "git_status_foreach_ext", "git_repository_free"));
+}
+
+TEST_F(StatusWalk, AsksForTheOptionsFirst)
+{
+    const auto factory = std::make_shared<vclink::test::TestOptionsFactory>(interactor_);
+    factory->onStatusOptions = [this] { calls_.names.emplace_back("makeStatusOptions"); };
+    vclink::git::GitAdapter adapter(asPath(folder() / "missing"), factory);
+    calls_.names.clear();
+    EXPECT_THROW(adapter.getFolderStates(adapter.getRootFolder()), LibGit2Exception);
+    ASSERT_GE(calls_.names.size(), 3U);
+    calls_.names.resize(3);
+    EXPECT_THAT(calls_.names, ElementsAre("makeStatusOptions", "git_status_options_init",
+                                          "git_repository_open_ext"));
 }
 
 TEST_F(StatusWalk, OpensTheRootItselfWithoutASearch)

@@ -198,18 +198,28 @@ TEST_F(Callback, WithoutAResultLeavesAParkedExceptionAlone)
     EXPECT_EQ(pendingCallbackException(), parked);
 }
 
-/// Lets a callback throw, and expects Boost's text of the exception and then a stack.
-template <class Exception> void expectReports(const Exception &exception)
+/// Boost's text of an exception that is a boost::exception or a std::exception.
+template <class Exception> std::string describe(const Exception &exception)
 {
-    std::string expected;
     try
     {
         throw exception;
     }
     catch (...)
     {
-        expected = "Exception caught: " + boost::current_exception_diagnostic_information(true);
+        return boost::current_exception_diagnostic_information(true);
     }
+}
+
+std::string describe(int /*exception*/)
+{
+    return "No diagnostic information available.";
+}
+
+/// Lets a callback throw, and expects the text of the exception and then a stack.
+template <class Exception> void expectReports(const Exception &exception)
+{
+    const std::string expected = "Exception caught: " + describe(exception);
     Target target;
     target.body = [&exception]() -> int { throw exception; };
     const LogCapture log(SeverityException | SeverityStackTrace);

@@ -3,12 +3,11 @@
 
 #include <utility>
 
+#include <boost/log/attributes/attribute_set.hpp>
 #include <boost/log/attributes/attribute_value_impl.hpp>
+#include <boost/log/attributes/constant.hpp>
 #include <boost/log/core.hpp>
 #include <boost/log/expressions/message.hpp>
-#include <boost/log/keywords/channel.hpp>
-#include <boost/log/keywords/severity.hpp>
-#include <boost/log/sources/severity_channel_logger.hpp>
 #include <boost/thread/tss.hpp>
 
 #include "foundation/core/log/logger_registry.hpp"
@@ -51,13 +50,13 @@ typename diagnostic_record<Char>::Impl &diagnostic_record<Char>::impl() noexcept
 
 template <class Char> struct basic_diagnostic_logger<Char>::Impl
 {
-    explicit Impl(const std::string &channel)
-        : name(channel), source(boost::log::keywords::channel = channel)
+    explicit Impl(const std::string &channel) : name(channel)
     {
+        attributes["Channel"] = boost::log::attributes::constant<std::string>(channel);
     }
 
     std::string name;
-    boost::log::sources::severity_channel_logger_mt<unsigned, std::string> source;
+    boost::log::attribute_set attributes;
     boost::thread_specific_ptr<int> depth;
 };
 
@@ -97,8 +96,11 @@ template <class Char> bool basic_diagnostic_logger<Char>::is_logging_enabled() c
 template <class Char>
 diagnostic_record<Char> basic_diagnostic_logger<Char>::open_record(unsigned severity)
 {
-    boost::log::record record =
-        impl_->source.open_record(boost::log::keywords::severity = severity);
+    // The record holds its severity itself. Boost's severity loggers keep it with the thread, where
+    // a record that is written while this one's text is made would change it.
+    boost::log::attribute_set attributes = impl_->attributes;
+    attributes["Severity"] = boost::log::attributes::constant<unsigned>(severity);
+    boost::log::record record = boost::log::core::get()->open_record(attributes);
     if (!record)
     {
         return {};
@@ -114,7 +116,7 @@ void basic_diagnostic_logger<Char>::push_record(diagnostic_record<Char> record,
     boost::log::record &opened = record.impl().record;
     opened.attribute_values().insert(boost::log::expressions::tag::message::get_name(),
                                      boost::log::attributes::make_attribute_value(text));
-    impl_->source.push_record(std::move(opened));
+    boost::log::core::get()->push_record(std::move(opened));
 }
 
 template <class Char> int &basic_diagnostic_logger<Char>::scope_depth()
