@@ -9,7 +9,8 @@ add_custom_target(vclink_thread_tests)
 
 function(vclink_add_tests target)
     cmake_parse_arguments(PARSE_ARGV 1 arg "" "" "LABELS;SOURCES;LIBRARIES")
-    add_executable(${target} ${arg_SOURCES})
+    add_executable(${target}
+        ${arg_SOURCES} ${PROJECT_SOURCE_DIR}/tests/support/leakSuppressions.cpp)
     vclink_configure_target(${target})
     target_link_libraries(${target} PRIVATE
         vclink_git_objects vclink_test_support ${arg_LIBRARIES} GTest::gmock GTest::gtest_main)

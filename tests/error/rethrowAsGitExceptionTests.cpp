@@ -6,7 +6,6 @@
 #include <string>
 #include <typeinfo>
 
-#include <boost/exception/diagnostic_information.hpp>
 #include <boost/exception/exception.hpp>
 #include <boost/throw_exception.hpp>
 #include <gmock/gmock.h>
@@ -17,6 +16,7 @@
 #include "fl/i18n/MessageCatalog.hpp"
 #include "fl/i18n/VkLocale.hpp"
 #include "support/LogCapture.hpp"
+#include "support/diagnosticText.hpp"
 #include "vclink/git/GitException.hpp"
 #include "vclink/git/messageIdentifiers.hpp"
 
@@ -27,6 +27,7 @@ namespace
 
 using shared_vclink::git::HasConflicts;
 using shared_vclink::git::MergeFailed;
+using test::diagnosticTextOf;
 using test::LogCapture;
 using testing::ElementsAre;
 
@@ -178,29 +179,11 @@ TEST(RethrowAsGitException, LetsAnExceptionThatIsBoostsOnlyPassUnchanged)
     ADD_FAILURE() << "nothing was raised";
 }
 
-/// Boost's text of an exception that is a boost::exception or a std::exception.
-template <class Exception> std::string describe(const Exception &exception)
-{
-    try
-    {
-        throw exception;
-    }
-    catch (...)
-    {
-        return boost::current_exception_diagnostic_information(true);
-    }
-}
-
-std::string describe(int /*exception*/)
-{
-    return "No diagnostic information available.";
-}
-
 /// Throws `exception`, replaces it, and expects one record with the text of it.
 template <class Exception> void expectReported(const Exception &exception)
 {
     const LogCapture log(SeverityException | SeverityDiagnostic | SeverityParameter);
-    const std::string expected = "Exception caught: " + describe(exception);
+    const std::string expected = "Exception caught: " + diagnosticTextOf(exception);
     try
     {
         try

@@ -12,13 +12,13 @@
 #include <utility>
 #include <vector>
 
-#include <boost/exception/diagnostic_information.hpp>
 #include <boost/exception/exception.hpp>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include "error/CoreFilter.hpp"
 #include "support/LogCapture.hpp"
+#include "support/diagnosticText.hpp"
 #include "vclink/util/exception/CancelledOperationException.hpp"
 
 namespace vclink::git
@@ -27,6 +27,7 @@ namespace
 {
 
 using test::CoreFilter;
+using test::diagnosticTextOf;
 using test::LogCapture;
 using test::LogRecord;
 using testing::ElementsAre;
@@ -198,28 +199,10 @@ TEST_F(Callback, WithoutAResultLeavesAParkedExceptionAlone)
     EXPECT_EQ(pendingCallbackException(), parked);
 }
 
-/// Boost's text of an exception that is a boost::exception or a std::exception.
-template <class Exception> std::string describe(const Exception &exception)
-{
-    try
-    {
-        throw exception;
-    }
-    catch (...)
-    {
-        return boost::current_exception_diagnostic_information(true);
-    }
-}
-
-std::string describe(int /*exception*/)
-{
-    return "No diagnostic information available.";
-}
-
 /// Lets a callback throw, and expects the text of the exception and then a stack.
 template <class Exception> void expectReports(const Exception &exception)
 {
-    const std::string expected = "Exception caught: " + describe(exception);
+    const std::string expected = "Exception caught: " + diagnosticTextOf(exception);
     Target target;
     target.body = [&exception]() -> int { throw exception; };
     const LogCapture log(SeverityException | SeverityStackTrace);

@@ -18,7 +18,7 @@ constexpr const char *longName = "a/folder/of/some/depth/and/a/file/of/40.txt";
 
 TEST(JoinRepositoryPathAllocation, TakesOneOfTheRightSizeForAKey)
 {
-    const upath root(u"/home/somebody/work/repository");
+    const upath root(u"/home/somebody/code/repository");
     const AllocationCounter counter;
     const upath joined = joinRepositoryPath(root, longName);
     const std::size_t count = counter.count();
@@ -30,7 +30,7 @@ TEST(JoinRepositoryPathAllocation, TakesOneOfTheRightSizeForAKey)
 
 TEST(JoinRepositoryPathAllocation, TakesOneMoreForANameThatIsNotAscii)
 {
-    const upath root(u"/home/somebody/work/repository");
+    const upath root(u"/home/somebody/code/repository");
     const AllocationCounter counter;
     const upath joined = joinRepositoryPath(root, "\xC3\xBC/folder/of/some/depth/and/a/file.txt");
     EXPECT_LE(counter.count(), 2U);

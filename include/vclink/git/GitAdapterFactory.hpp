@@ -53,8 +53,11 @@ class VCLINK_GIT_EXPORT GitAdapterFactory : public vclink::CMAdapterFactory
     createWorkingCopyGenerator(std::shared_ptr<ApplicationInteractor> interactor) const override;
 
     /// Whether this very folder is a Git repository, with or without a working tree. A folder
-    /// inside a working copy is not. Holds a LibGit2Guard for the call. git_repository_open_ext.
-    /// @throws LibGit2Exception when that can't be found out, e.g. for lack of permission
+    /// inside a working copy is not. Looks at the folder's layout only: whether the repository can
+    /// be opened, and belongs to the user, shows at an adapter's first operation. Holds a
+    /// LibGit2Guard for the call. git_repository_open_ext.
+    /// @throws LibGit2Exception when that can't be found out, e.g. for lack of permission to enter
+    /// a folder above it
     bool isAdapterFor(const upath &path) const override;
 
     /// "git".
