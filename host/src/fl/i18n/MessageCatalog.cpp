@@ -1,12 +1,12 @@
 // SPDX-License-Identifier: MIT
 #include "fl/i18n/MessageCatalog.hpp"
 
-#include <boost/format.hpp>
 #include <boost/variant/apply_visitor.hpp>
 #include <boost/variant/static_visitor.hpp>
 
 #include "fl/i18n/convert.hpp"
 #include "fl/i18n/english_texts.hpp"
+#include "fl/i18n/placeholders.hpp"
 #include "fl/i18n/translations.hpp"
 
 namespace fl::i18n
@@ -34,18 +34,15 @@ struct ToUtf8 : boost::static_visitor<std::string>
     }
 };
 
-/// Fills the placeholders. Whatever a translator made of them, nothing is raised: a placeholder
-/// without an argument becomes empty, an argument without a placeholder is left out.
-std::string fill(const std::string &text, const std::vector<MsgArgument> &arguments)
+std::vector<std::string> toUtf8(const std::vector<MsgArgument> &arguments)
 {
-    boost::format format;
-    format.exceptions(boost::io::no_error_bits);
-    format.parse(text);
+    std::vector<std::string> texts;
+    texts.reserve(arguments.size());
     for (const MsgArgument &argument : arguments)
     {
-        format % boost::apply_visitor(ToUtf8(), argument);
+        texts.push_back(boost::apply_visitor(ToUtf8(), argument));
     }
-    return format.str();
+    return texts;
 }
 
 /// "catalogue:key (argument, argument)"
@@ -72,7 +69,7 @@ ustring MessageCatalog::get_message(const BaseMsgID &message, const VkLocale &lo
         return utf8_to_ustring(describe(message));
     }
     const std::string text = translate(locale, message.getKey(), english);
-    return utf8_to_ustring(fill(text, message.getArguments()));
+    return utf8_to_ustring(fillPlaceholders(text, toUtf8(message.getArguments())));
 }
 
 } // namespace fl::i18n

@@ -3,6 +3,7 @@
 
 #include <algorithm>
 #include <iterator>
+#include <string_view>
 
 // The template of the translations is extracted from this file, the key being the message's
 // context: see host/po/CMakeLists.txt.
@@ -15,11 +16,11 @@ namespace
 
 struct EnglishText
 {
-    const char *key;
+    std::string_view key;
     const char *text;
 };
 
-const EnglishText texts[] = {
+constexpr EnglishText texts[] = {
     VCLINK_TEXT("LibGit2Error",
                 // TRANSLATORS: %1% and %2% are numbers; %3% is Git's own explanation, always
                 // English, without a full stop.

@@ -58,6 +58,12 @@ std::string getInstalledCatalogues()
     return ustring_to_utf8(folder);
 }
 
+/// Whether a locale has no translations by its name alone.
+bool isUntranslated(const std::string &name)
+{
+    return name.empty() || name == "C" || name == "POSIX" || name.compare(0, 2, "C.") == 0;
+}
+
 using Messages = boost::locale::message_format<char>;
 
 /// A locale object that owns the language's catalogue; the classic one when the file is broken.
@@ -122,8 +128,12 @@ Catalogues &catalogues()
 
 std::string translate(const VkLocale &locale, const std::string &key, const char *english)
 {
+    if (isUntranslated(locale.name()))
+    {
+        return english;
+    }
     const Language language = parseLocaleName(locale.name());
-    if (language.language.empty() || language.language == "C" || language.language == "POSIX")
+    if (language.language.empty())
     {
         return english;
     }

@@ -1,0 +1,189 @@
+// SPDX-License-Identifier: MIT
+// The tools that the stand-in ships at the place below the installation that is agreed on.
+#include <array>
+#include <cstdio>
+#include <string>
+
+#include <boost/filesystem/directory.hpp>
+#include <boost/filesystem/operations.hpp>
+#include <gtest/gtest.h>
+#include <sys/wait.h>
+
+#include "support/TemporaryFolder.hpp"
+
+using namespace vclink_host_tests;
+
+namespace
+{
+
+struct Result
+{
+    int status = -1;
+    /// Of standard output and standard error together.
+    std::string output;
+};
+
+std::string quoted(const std::string &word)
+{
+    std::string text = "'";
+    for (const char character : word)
+        text += character == '\'' ? std::string("'\\''") : std::string(1, character);
+    return text + "'";
+}
+
+std::string launcher(const std::string &name)
+{
+    return std::string(VCLINK_STAGE_DIR) + "/bin/lnxhost/" + name;
+}
+
+class StandInLaunchers : public testing::Test
+{
+  protected:
+    StandInLaunchers()
+    {
+        boost::filesystem::create_directory(temporary_);
+    }
+
+    /// Runs a launcher with files of the folder as its arguments.
+    template <class... Names> Result run(const std::string &path, const Names &...names) const
+    {
+        std::string command = quoted(path);
+        ((command += ' ' + quoted(folder_.file(names))), ...);
+        Result result;
+        std::FILE *const output = ::popen((command + " 2>&1 </dev/null").c_str(), "r");
+        std::array<char, 4096> block{};
+        for (std::size_t size = 0; (size = std::fread(block.data(), 1, block.size(), output)) != 0;)
+            result.output.append(block.data(), size);
+        const int status = ::pclose(output);
+        result.status = WIFEXITED(status) ? WEXITSTATUS(status) : -1;
+        return result;
+    }
+    void writeSides(const std::string &ours, const std::string &theirs) const
+    {
+        writeFile(folder_.file("base"), "1\n2\n3\n4\n5\n");
+        writeFile(folder_.file("ours"), ours);
+        writeFile(folder_.file("theirs"), theirs);
+    }
+    std::string read(const std::string &name) const
+    {
+        return readFile(folder_.file(name));
+    }
+    bool nothingIsLeft() const
+    {
+        return boost::filesystem::is_empty(temporary_);
+    }
+
+    const TemporaryFolder folder_;
+
+  private:
+    const std::string temporary_ = folder_.file("tmp with a blank");
+    const ScopedVariable variable_{"TMPDIR", temporary_.c_str()};
+};
+
+const std::string clean = "ours\n2\n3\n4\ntheirs\n";
+
+TEST_F(StandInLaunchers, CanBeExecuted)
+{
+    for (const auto *name : {"vkAutoMerge.sh", "vkMerge", "vkDiff"})
+    {
+        const auto status = boost::filesystem::status(launcher(name));
+        EXPECT_TRUE(boost::filesystem::is_regular_file(status)) << name;
+        EXPECT_EQ(status.permissions() & boost::filesystem::others_exe,
+                  boost::filesystem::others_exe)
+            << name;
+    }
+}
+
+TEST_F(StandInLaunchers, MergeIntoOneOfTheSides)
+{
+    writeSides("ours\n2\n3\n4\n5\n", "1\n2\n3\n4\ntheirs\n");
+    EXPECT_EQ(run(launcher("vkAutoMerge.sh"), "base", "ours", "theirs", "ours").status, 0);
+    EXPECT_EQ(read("ours"), clean);
+    EXPECT_EQ(read("base"), "1\n2\n3\n4\n5\n");
+    EXPECT_EQ(read("theirs"), "1\n2\n3\n4\ntheirs\n");
+    EXPECT_TRUE(nothingIsLeft());
+}
+
+TEST_F(StandInLaunchers, MergeIntoAFourthFile)
+{
+    for (const auto *name : {"vkAutoMerge.sh", "vkMerge"})
+    {
+        writeSides("ours\n2\n3\n4\n5\n", "1\n2\n3\n4\ntheirs\n");
+        writeFile(folder_.file("merged"), "with markers\n");
+        EXPECT_EQ(run(launcher(name), "base", "ours", "theirs", "merged").status, 0) << name;
+        EXPECT_EQ(read("merged"), clean) << name;
+        EXPECT_EQ(read("ours"), "ours\n2\n3\n4\n5\n") << name;
+    }
+}
+
+TEST_F(StandInLaunchers, TellConflictsAndLeaveTheResultAsItIs)
+{
+    for (const auto *name : {"vkAutoMerge.sh", "vkMerge"})
+    {
+        writeSides("ours\n", "theirs\n");
+        writeFile(folder_.file("merged"), "as it was\n");
+        EXPECT_GT(run(launcher(name), "base", "ours", "theirs", "merged").status, 0) << name;
+        EXPECT_EQ(read("merged"), "as it was\n") << name;
+        EXPECT_TRUE(nothingIsLeft()) << name;
+    }
+}
+
+TEST_F(StandInLaunchers, TellConflictsOfBinaryFiles)
+{
+    writeSides(std::string("ours\0", 5), std::string("theirs\0", 7));
+    EXPECT_GT(run(launcher("vkAutoMerge.sh"), "base", "ours", "theirs", "ours").status, 0);
+    EXPECT_EQ(read("ours"), std::string("ours\0", 5));
+    EXPECT_TRUE(nothingIsLeft());
+}
+
+TEST_F(StandInLaunchers, TellAFileThatIsMissing)
+{
+    writeSides("ours\n", "theirs\n");
+    for (const auto *name : {"vkAutoMerge.sh", "vkMerge"})
+    {
+        EXPECT_GT(run(launcher(name), "missing", "ours", "theirs", "ours").status, 0) << name;
+        EXPECT_EQ(read("ours"), "ours\n") << name;
+    }
+    EXPECT_GT(run(launcher("vkDiff"), "missing", "ours").status, 0);
+}
+
+TEST_F(StandInLaunchers, ShowWhatIsDifferent)
+{
+    writeSides("1\n2\n3\nours\n5\n", "");
+    const Result result = run(launcher("vkDiff"), "base", "ours");
+    EXPECT_EQ(result.status, 0);
+    EXPECT_EQ(result.output, "--- " + folder_.file("base") + "\n+++ " + folder_.file("ours") +
+                                 "\n@@ -1,5 +1,5 @@\n 1\n 2\n 3\n-4\n+ours\n 5\n");
+}
+
+TEST_F(StandInLaunchers, ShowNothingOfEqualFiles)
+{
+    writeSides("1\n2\n3\n4\n5\n", "");
+    const Result result = run(launcher("vkDiff"), "base", "ours");
+    EXPECT_EQ(result.status, 0);
+    EXPECT_EQ(result.output, "");
+}
+
+TEST_F(StandInLaunchers, WantTheirNumberOfArguments)
+{
+    writeSides("ours\n", "theirs\n");
+    EXPECT_EQ(run(launcher("vkAutoMerge.sh"), "base", "ours", "theirs").status, 2);
+    EXPECT_EQ(run(launcher("vkMerge")).status, 2);
+    EXPECT_EQ(run(launcher("vkMerge"), "base", "ours", "theirs", "ours", "more").status, 2);
+    EXPECT_EQ(run(launcher("vkDiff"), "base").status, 2);
+    EXPECT_EQ(run(launcher("vkDiff")).output, "usage: vkDiff LOCAL REMOTE\n");
+    EXPECT_EQ(read("ours"), "ours\n");
+}
+
+TEST_F(StandInLaunchers, WorkBelowAFolderWithABlank)
+{
+    const std::string copy = folder_.file("my host");
+    boost::filesystem::create_directory(copy);
+    for (const auto *name : {"vkAutoMerge.sh", "vkMerge"})
+        boost::filesystem::copy_file(launcher(name), copy + '/' + name);
+    writeSides("ours\n2\n3\n4\n5\n", "1\n2\n3\n4\ntheirs\n");
+    EXPECT_EQ(run(copy + "/vkMerge", "base", "ours", "theirs", "a new file").status, 0);
+    EXPECT_EQ(read("a new file"), clean);
+}
+
+} // namespace
