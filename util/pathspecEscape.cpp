@@ -21,8 +21,22 @@ bool contains(std::string_view characters, char character)
 /// unless a backslash stands before it.
 std::string classOf(char character)
 {
-    const bool special = character == '!' || contains(lineEnds, character);
+    const bool special = character == '!' || character == '\\' || contains(lineEnds, character);
     return std::string(special ? "[\\" : "[") + character + ']';
+}
+
+/// The one character as the complement of all others. libgit2 also takes a pattern for a name, as
+/// it stands; the two slashes see to it that no file has this one.
+std::string complementOf(char character)
+{
+    const auto escaped = [](int code)
+    {
+        const char end = static_cast<char>(code);
+        const bool special = contains("\\]!^-", end) || contains(whiteSpace, end);
+        return special ? std::string("\\") + end : std::string(1, end);
+    };
+    const int code = static_cast<unsigned char>(character);
+    return "[^//\x01-" + escaped(code - 1) + escaped(code + 1) + "-\xFF]";
 }
 
 /// Nearly all names are read as they stand.
@@ -33,26 +47,28 @@ bool isReadAsItStands(std::string_view name)
            name.find_first_of(lineEnds) == std::string_view::npos;
 }
 
-} // namespace
-
-std::string escapePathspec(std::string_view name)
+/// Where the white space begins that libgit2 would cut.
+std::size_t findTrailingWhiteSpace(std::string_view name)
 {
-    if (isReadAsItStands(name))
-    {
-        return std::string(name);
-    }
-    const std::size_t lastPlain = name.find_last_not_of(whiteSpace);
-    const std::size_t end = lastPlain == std::string_view::npos ? 0 : lastPlain + 1;
+    const std::size_t last = name.find_last_not_of(whiteSpace);
+    return last == std::string_view::npos ? 0 : last + 1;
+}
+
+/// @param special what gets a class wherever it stands
+/// @param makeClass makes a pattern that means one character
+std::string escape(std::string_view name, std::string_view special,
+                   std::string (*makeClass)(char character))
+{
+    const std::size_t end = findTrailingWhiteSpace(name);
     std::string pattern;
     pattern.reserve(name.size());
     for (std::size_t i = 0; i < name.size(); ++i)
     {
         const char character = name[i];
         const bool leading = i == 0 && (character == '#' || character == '!');
-        // A '[' left as it is could take a class that follows into its own.
-        if (leading || i >= end || character == '[' || contains(lineEnds, character))
+        if (leading || i >= end || contains(special, character) || contains(lineEnds, character))
         {
-            pattern += classOf(character);
+            pattern += makeClass(character);
         }
         else
         {
@@ -60,6 +76,19 @@ std::string escapePathspec(std::string_view name)
         }
     }
     return pattern;
+}
+
+} // namespace
+
+std::string escapePathspec(std::string_view name)
+{
+    // A '[' left as it is could take a class that follows into its own.
+    return isReadAsItStands(name) ? std::string(name) : escape(name, "[", classOf);
+}
+
+std::string escapeExactPathspec(std::string_view name)
+{
+    return escape(name, "*?[\\", complementOf);
 }
 
 } // namespace vclink::git

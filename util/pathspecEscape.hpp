@@ -13,4 +13,7 @@ namespace vclink::git
 /// '[' in such a name, which then means itself.
 std::string escapePathspec(std::string_view name);
 
+/// A pathspec that matches nothing but this name, wildcard characters included.
+std::string escapeExactPathspec(std::string_view name);
+
 } // namespace vclink::git

@@ -16,6 +16,7 @@
 namespace
 {
 
+using vclink::git::escapeExactPathspec;
 using vclink::git::escapePathspec;
 using vclink::git::makeFilePathspec;
 using vclink::test::asPath;
@@ -164,6 +165,87 @@ TEST_F(PathspecEscape, ActsAsAPatternForWildcardCharacters)
         for (const auto &answer : matches.inEveryCall(pathspec))
             EXPECT_EQ(answer.names, meant) << answer.call << " for " << shown(name);
     }
+}
+
+/// The names of files that hold what acts as a pattern elsewhere.
+const std::vector<std::string> wildcardNames{
+    "*",    "?",    "a*",  "a?",   "[",    "[a]",   "[ab]",  "a[1]",  "[!a]",   "[^a]", "**",
+    "\\",   "a\\b", "a\\", "\\*",  "\\[",  "[\\]",  "[a\\]", "\\#a",  "#*",     "!?",   "* ",
+    "[ ",   "a*\n", "*\r", "[]",   "[]a]", "f/*",   "f*/x",  "f/[x]", "f[1]/x", "\\!a", "[[]",
+    "[\n]", "?\f",  "\\ ", "a\\ ", "\\\\", "[:a:]", "a[",    "#[",    "[*]"};
+
+/// What those names would match as patterns.
+const std::vector<std::string> decoys{"x", "ab", "a1", "ac", "f/x", "fx/x", "f1/x", "b", "1"};
+
+class ExactPathspec : public PathspecEscape
+{
+  protected:
+    static std::vector<std::string> allNames()
+    {
+        auto names = hardNames;
+        for (const auto *more : {&wildcardNames, &decoys})
+            names.insert(names.end(), more->begin(), more->end());
+        return names;
+    }
+    void expectMeansExactly(const vclink::test::PathspecMatches &matches,
+                            const std::vector<std::string> &names) const
+    {
+        std::vector<std::string> patterns;
+        for (const auto &name : names)
+            patterns.push_back(escapeExactPathspec(name));
+        const vclink::git::PathspecArray pathspec(patterns);
+        for (const auto &answer : matches.inEveryCall(pathspec))
+        {
+            EXPECT_EQ(answer.names, Names(names.begin(), names.end()))
+                << answer.call << " for " << testing::PrintToString(names);
+        }
+    }
+};
+
+TEST_F(ExactPathspec, LeavesAPlainNameAsItIs)
+{
+    for (const auto *name : {"a", "sub/dir/file.txt", "a#b", "a!b", "a b", " a", "sub /a", "a]",
+                             "gr\xC3\xBC\xC3\x9F", "\xFF", ""})
+        EXPECT_EQ(escapeExactPathspec(name), name);
+}
+
+TEST_F(ExactPathspec, ReplacesOnlyWhatMeansSomethingElse)
+{
+    EXPECT_EQ(escapeExactPathspec("a*b"), "a[^//\x01-)+-\xFF]b");
+    EXPECT_EQ(escapeExactPathspec("[x]"), "[^//\x01-Z\\\\-\xFF]x]");
+    EXPECT_EQ(escapeExactPathspec("#a#"), "[^//\x01-\"$-\xFF]"
+                                          "a#");
+    EXPECT_EQ(escapeExactPathspec("a\nb"), "a[^//\x01-\\\t\\\v-\xFF]"
+                                           "b");
+    EXPECT_EQ(escapeExactPathspec(" a "), " a[^//\x01-\x1F\\!-\xFF]");
+}
+
+/// libgit2 compares a pattern as it stands, too.
+TEST_F(ExactPathspec, IsNoNameOfAnotherFile)
+{
+    for (const auto &name : wildcardNames)
+        EXPECT_NE(escapeExactPathspec(name).find("//"), std::string::npos) << shown(name);
+}
+
+TEST_F(ExactPathspec, MeansExactlyTheOneFile)
+{
+    const auto repository = makeTree(allNames());
+    const vclink::test::PathspecMatches matches(repository);
+    for (const auto &name : wildcardNames)
+        expectMeansExactly(matches, {name});
+    for (const auto &name : hardNames)
+        expectMeansExactly(matches, {name});
+}
+
+TEST_F(ExactPathspec, MeansExactlyTheFilesOfAList)
+{
+    const auto repository = makeTree(allNames());
+    const vclink::test::PathspecMatches matches(repository);
+    expectMeansExactly(matches, wildcardNames);
+    for (std::size_t i = 0; i + 1 < wildcardNames.size(); ++i)
+        expectMeansExactly(matches, {wildcardNames[i], wildcardNames[i + 1]});
+    expectMeansExactly(matches, {"#a", "!a"});
+    expectMeansExactly(matches, {"*", "*", "*"});
 }
 
 } // namespace

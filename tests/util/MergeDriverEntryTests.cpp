@@ -1,0 +1,382 @@
+// SPDX-License-Identifier: MIT
+// The driver's entry, called as libgit2 calls it, with libgit2's answers made by the test.
+#include <csignal>
+#include <cstdint>
+#include <exception>
+#include <filesystem>
+#include <optional>
+#include <stdexcept>
+#include <string>
+#include <system_error>
+#include <utility>
+#include <vector>
+
+#include <git2.h>
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include "MergeDriverCalls.hpp"
+#include "NothingLeft.hpp"
+#include "Scripts.hpp"
+#include "error/errorUtil/GitResult.hpp"
+#include "error/errorUtil/callbackException.hpp"
+#include "support/GitTest.hpp"
+#include "support/LibGit2Session.hpp"
+#include "support/LogCapture.hpp"
+#include "util/GitMergeDriverLookup.hpp"
+#include "vclink/git/LibGit2Exception.hpp"
+#include "vclink/git/LibGit2Guard.hpp"
+
+namespace
+{
+
+namespace git = vclink::git;
+using testing::ElementsAre;
+using testing::IsEmpty;
+using vclink::test::LogCapture;
+using vclink::test::LogRecord;
+using vclink::test::MergeDriverCalls;
+using vclink::test::Scripts;
+
+/// What the driver gives back.
+struct Answer
+{
+    int code = 0;
+    /// empty unless the driver has set it
+    std::optional<std::string> path;
+    std::optional<std::uint32_t> mode;
+    std::string content;
+    /// what the driver has left in the slot, taken out of it
+    std::exception_ptr exception;
+};
+
+class MergeDriverEntry : public vclink::test::GitTest
+{
+  protected:
+    MergeDriverEntry()
+    {
+        opened_ =
+            git::acquire<git_repository>(git_repository_open, repository_.path().c_str()).value();
+        calls_.repository = opened_.get();
+        calls_.ancestor = makeEntry(ancestor_, "base\n");
+        calls_.ours = makeEntry(ours_, "ours\n");
+        calls_.theirs = makeEntry(theirs_, "theirs\n");
+        calls_.names.clear();
+    }
+
+    /// The driver's answer for the driver "tool".
+    Answer apply()
+    {
+        const vclink::test::NothingLeft check(environment().temporary());
+        static const char untouched[] = "untouched";
+        const char *path = untouched;
+        std::uint32_t mode = 7;
+        git_buf content = GIT_BUF_INIT;
+        Answer answer;
+        answer.code = git::wildcardApplyEntry(nullptr, &path, &mode, &content, "tool", nullptr);
+        if (path != untouched)
+            answer.path = path;
+        if (mode != 7)
+            answer.mode = mode;
+        if (content.size != 0)
+            answer.content.assign(content.ptr, content.size);
+        git_buf_dispose(&content);
+        std::swap(answer.exception, git::pendingCallbackException());
+        return answer;
+    }
+    void defineScript(const std::string &script)
+    {
+        repository_.git(
+            {"config", "merge.tool.driver", scripts_.shell(script) + " %O %A %B %L %P"});
+    }
+    template <class Exception> static bool holds(const std::exception_ptr &exception)
+    {
+        try
+        {
+            if (exception != nullptr)
+                std::rethrow_exception(exception);
+        }
+        catch (const Exception &)
+        {
+            return true;
+        }
+        catch (...)
+        {
+            return false;
+        }
+        return false;
+    }
+    /// The code of the LibGit2Exception; 0 when it is none.
+    static int codeOf(const std::exception_ptr &exception)
+    {
+        try
+        {
+            if (exception != nullptr)
+                std::rethrow_exception(exception);
+        }
+        catch (const git::LibGit2Exception &raised)
+        {
+            return raised.getError().getCode();
+        }
+        catch (const std::exception &)
+        {
+            return 0;
+        }
+        return 0;
+    }
+
+    git_index_entry ancestor_ = {};
+    git_index_entry ours_ = {};
+    git_index_entry theirs_ = {};
+    Scripts scripts_{folder() / "scripts"};
+    vclink::test::GitRepository repository_ = makeRepository();
+    vclink::test::LibGit2Session session_{environment()};
+    MergeDriverCalls calls_;
+    git::OwnedHandle<git_repository> opened_;
+
+  private:
+    const git_index_entry *makeEntry(git_index_entry &entry, const std::string &content)
+    {
+        repository_.write("side", content);
+        const std::string id = repository_.line({"hash-object", "-w", "side"});
+        git_oid_fromstr(&entry.id, id.c_str());
+        entry.mode = GIT_FILEMODE_BLOB;
+        entry.path = "file";
+        return &entry;
+    }
+};
+
+TEST_F(MergeDriverEntry, ReportsEachMissingSideAndReadsNothing)
+{
+    defineScript("exit 0");
+    for (unsigned missing = 1; missing < 8; ++missing)
+    {
+        SCOPED_TRACE(missing);
+        calls_.names.clear();
+        calls_.ancestor = (missing & 1) != 0 ? nullptr : &ancestor_;
+        calls_.ours = (missing & 2) != 0 ? nullptr : &ours_;
+        calls_.theirs = (missing & 4) != 0 ? nullptr : &theirs_;
+        std::vector<std::string> expected;
+        if ((missing & 1) != 0)
+            expected.emplace_back("base is nullptr");
+        if ((missing & 2) != 0)
+            expected.emplace_back("mine is nullptr");
+        if ((missing & 4) != 0)
+            expected.emplace_back("theirs is nullptr");
+        const LogCapture log(0x08);
+        const Answer answer = apply();
+        EXPECT_EQ(answer.code, GIT_EMERGECONFLICT);
+        EXPECT_EQ(log.messages(), expected);
+        EXPECT_THAT(calls_.names, ElementsAre("ancestor", "ours", "theirs", "file_options"));
+        EXPECT_FALSE(answer.path);
+        EXPECT_FALSE(answer.mode);
+    }
+}
+
+TEST_F(MergeDriverEntry, CallsLibGit2InThisOrder)
+{
+    defineScript("echo merged >\"$2\"");
+    std::vector<bool> filesAtRelease;
+    calls_.onCall = [&](const std::string &name)
+    {
+        if (name == "entry_free")
+            filesAtRelease.push_back(std::filesystem::is_empty(environment().temporary()));
+    };
+    // libgit2 itself reads the configuration before the first object.
+    apply();
+    calls_.names.clear();
+    filesAtRelease.clear();
+    const Answer answer = apply();
+    EXPECT_EQ(answer.code, 0);
+    EXPECT_THAT(calls_.names,
+                ElementsAre("ancestor", "ours", "theirs", "file_options", "repo", "config_snapshot",
+                            "get_entry", "odb", "odb_read", "object_free", "odb_free", "odb",
+                            "odb_read", "object_free", "odb_free", "odb", "odb_read", "object_free",
+                            "odb_free", "buf_set", "entry_free", "config_free"));
+    // The temporary files go before the configuration.
+    EXPECT_THAT(filesAtRelease, ElementsAre(true));
+    EXPECT_EQ(answer.path, "file");
+    EXPECT_EQ(answer.mode, 0100644U);
+    EXPECT_EQ(answer.content, "merged\n");
+}
+
+TEST_F(MergeDriverEntry, ReadsNoResultOfARefusal)
+{
+    defineScript("echo merged >\"$2\"; exit 1");
+    const Answer answer = apply();
+    EXPECT_EQ(answer.code, GIT_EMERGECONFLICT);
+    EXPECT_THAT(calls_.names, testing::Not(testing::Contains("buf_set")));
+    EXPECT_FALSE(answer.path);
+    EXPECT_FALSE(answer.mode);
+    EXPECT_EQ(answer.content, "");
+}
+
+TEST_F(MergeDriverEntry, PassesTheFileOnWhateverKeepsTheKeyFromBeingRead)
+{
+    defineScript("exit 0");
+    for (const int code : {-3, -1, -12, 1})
+    {
+        calls_.names.clear();
+        calls_.onGetEntry = [code] { return code; };
+        const LogCapture log(0x200);
+        const Answer answer = apply();
+        EXPECT_EQ(answer.code, GIT_PASSTHROUGH);
+        EXPECT_THAT(log.messages(), ElementsAre("Merge driver merge.tool.driver not found"));
+        EXPECT_EQ(answer.exception, nullptr);
+        EXPECT_EQ(calls_.names.back(), "config_free");
+        EXPECT_THAT(calls_.names, testing::Not(testing::Contains("odb")));
+    }
+}
+
+TEST_F(MergeDriverEntry, StoresTheFailureOfTheSnapshot)
+{
+    defineScript("exit 0");
+    calls_.onSnapshot = [] { return GIT_ELOCKED; };
+    const Answer answer = apply();
+    EXPECT_EQ(answer.code, GIT_EUSER);
+    EXPECT_EQ(codeOf(answer.exception), GIT_ELOCKED);
+    EXPECT_EQ(calls_.names.back(), "config_snapshot");
+}
+
+TEST_F(MergeDriverEntry, StoresTheFailureOfAnySideAndRemovesTheFilesBefore)
+{
+    defineScript("exit 0");
+    for (int failing = 0; failing < 3; ++failing)
+    {
+        int reads = 0;
+        calls_.onReadBlob = [&] { return reads++ == failing ? GIT_EINVALID : 0; };
+        const Answer answer = apply();
+        EXPECT_EQ(answer.code, GIT_EUSER);
+        EXPECT_EQ(codeOf(answer.exception), GIT_EINVALID);
+        EXPECT_EQ(reads, failing + 1);
+        EXPECT_FALSE(answer.path);
+    }
+}
+
+TEST_F(MergeDriverEntry, LeavesPathAndModeWhenTheResultCannotBeHandedOver)
+{
+    defineScript("exit 0");
+    calls_.onSetBuffer = [] { return GIT_ERROR; };
+    const Answer answer = apply();
+    EXPECT_EQ(answer.code, GIT_EUSER);
+    EXPECT_EQ(codeOf(answer.exception), GIT_ERROR);
+    EXPECT_FALSE(answer.path);
+    EXPECT_FALSE(answer.mode);
+    EXPECT_EQ(calls_.names.back(), "config_free");
+}
+
+TEST_F(MergeDriverEntry, WritesTheMarkerSizeInDecimal)
+{
+    const std::string out = folder() / "size";
+    defineScript("echo $4 >" + out);
+    for (const std::uint16_t size : std::vector<std::uint16_t>{0, 7, 12, 32768, 65535})
+    {
+        calls_.options.marker_size = size;
+        EXPECT_EQ(apply().code, 0);
+        EXPECT_EQ(Scripts::read(out), std::to_string(size) + '\n');
+    }
+}
+
+TEST_F(MergeDriverEntry, ChoosesPathAndModeEachByItself)
+{
+    defineScript("exit 0");
+    const auto pathFor = [this](const char *ancestor, const char *ours, const char *theirs)
+    {
+        ancestor_.path = ancestor;
+        ours_.path = ours;
+        theirs_.path = theirs;
+        return apply().path;
+    };
+    // Equal bytes at another address count as equal.
+    const std::string copy = "file";
+    EXPECT_EQ(pathFor("file", copy.c_str(), "new"), "new");
+    EXPECT_EQ(pathFor("file", "new", "file"), "new");
+    EXPECT_EQ(pathFor("file", "new", "other"), "new");
+    EXPECT_EQ(pathFor("file", "File", "other"), "File");
+    EXPECT_EQ(pathFor("file", "file", "file"), "file");
+    const auto modeFor = [this](std::uint32_t ancestor, std::uint32_t ours, std::uint32_t theirs)
+    {
+        ancestor_.mode = ancestor;
+        ours_.mode = ours;
+        theirs_.mode = theirs;
+        return apply().mode;
+    };
+    EXPECT_EQ(modeFor(0100644, 0100644, 0100755), 0100755U);
+    EXPECT_EQ(modeFor(0100644, 0100755, 0100644), 0100755U);
+    EXPECT_EQ(modeFor(0100755, 0100644, 0100755), 0100644U);
+    EXPECT_EQ(modeFor(0100644, 0100755, 0120000), 0100755U);
+}
+
+TEST_F(MergeDriverEntry, GivesTheEntrysOwnPath)
+{
+    defineScript("exit 0");
+    const std::string out = folder() / "path";
+    defineScript("printf %s \"$5\" >" + out);
+    theirs_.path = "sub/\xC3\xA9";
+    EXPECT_EQ(apply().path, "sub/\xC3\xA9");
+    EXPECT_EQ(Scripts::read(out), "sub/\xC3\xA9");
+}
+
+TEST_F(MergeDriverEntry, ReplacesAnExceptionThatWaitsInTheSlot)
+{
+    repository_.git({"config", "merge.tool.driver", "/nowhere/tool"});
+    git::storeCallbackException(std::make_exception_ptr(std::domain_error("earlier")));
+    const Answer answer = apply();
+    EXPECT_EQ(answer.code, GIT_EUSER);
+    EXPECT_FALSE(holds<std::domain_error>(answer.exception));
+    EXPECT_TRUE(holds<std::system_error>(answer.exception));
+}
+
+TEST_F(MergeDriverEntry, LeavesTheSlotWhenNothingIsRaised)
+{
+    defineScript("exit 1");
+    git::storeCallbackException(std::make_exception_ptr(std::domain_error("earlier")));
+    const Answer answer = apply();
+    EXPECT_EQ(answer.code, GIT_EMERGECONFLICT);
+    EXPECT_TRUE(holds<std::domain_error>(answer.exception));
+}
+
+TEST_F(MergeDriverEntry, EndsTheProcessWhenTheReportOfAnExceptionFails)
+{
+    repository_.git({"config", "merge.tool.driver", "/nowhere/tool"});
+    LogCapture log(0x10);
+    log.onRecord([](const LogRecord &) { throw std::domain_error("sink"); });
+    EXPECT_EXIT(apply(), testing::KilledBySignal(SIGABRT), "");
+}
+
+TEST(MergeDriverGuard, RegistersBetweenStartAndShutdown)
+{
+    MergeDriverCalls calls;
+    {
+        const git::LibGit2Guard guard;
+        EXPECT_THAT(calls.names, ElementsAre("init", "register"));
+    }
+    EXPECT_THAT(calls.names, ElementsAre("init", "register", "unregister", "shutdown"));
+}
+
+TEST(MergeDriverGuard, LooksAtNoResult)
+{
+    MergeDriverCalls calls;
+    for (const int code : {GIT_ERROR, GIT_EEXISTS, GIT_ENOTFOUND})
+    {
+        calls.onRegister = [code] { return code; };
+        calls.onUnregister = [code] { return code; };
+        EXPECT_NO_THROW(git::LibGit2Guard());
+    }
+}
+
+TEST(MergeDriverGuard, TellsOfTheEndBeforeIt)
+{
+    MergeDriverCalls calls;
+    LogCapture log;
+    std::vector<std::string> callsBefore;
+    log.onRecord([&](const LogRecord &) { callsBefore = calls.names; });
+    {
+        const git::LibGit2Guard guard;
+        EXPECT_THAT(log.messages(), IsEmpty());
+    }
+    EXPECT_THAT(log.messages(), ElementsAre("Unregister merge driver: *"));
+    EXPECT_THAT(callsBefore, ElementsAre("init", "register"));
+}
+
+} // namespace

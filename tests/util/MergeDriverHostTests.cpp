@@ -1,0 +1,157 @@
+// SPDX-License-Identifier: MIT
+// Merges through a command in hosts of different kinds.
+#include <algorithm>
+#include <cerrno>
+#include <csignal>
+#include <cstdlib>
+#include <filesystem>
+#include <string>
+#include <thread>
+#include <vector>
+
+#include <boost/process/exception.hpp>
+#include <fcntl.h>
+#include <gtest/gtest.h>
+#include <sys/resource.h>
+#include <unistd.h>
+
+#include "MergeDriverTest.hpp"
+#include "SignalAction.hpp"
+#include "support/UnprivilegedUser.hpp"
+
+namespace
+{
+
+namespace fs = std::filesystem;
+using vclink::test::Scripts;
+using vclink::test::SignalAction;
+
+class MergeDriverHost : public vclink::test::MergeDriverTest
+{
+  protected:
+    MergeDriverHost()
+    {
+        makeConflict();
+        defineScript("tool", "cat \"$1\" \"$3\" >>\"$2\"");
+    }
+    void expectMerged() const
+    {
+        EXPECT_EQ(merge(), 0);
+        EXPECT_EQ(staged("file"), "ours\nbase\ntheirs\n");
+    }
+};
+
+TEST_F(MergeDriverHost, MayIgnoreOrTakeASignalOfABrokenPipe)
+{
+    for (auto *const handler : {SIG_DFL, SIG_IGN})
+    {
+        const SignalAction action(SIGPIPE, handler);
+        expectMerged();
+        repository_.git({"reset", "--quiet", "--hard"});
+    }
+}
+
+TEST_F(MergeDriverHost, MayHaveAThousandDescriptorsOpen)
+{
+    rlimit before{};
+    ASSERT_EQ(::getrlimit(RLIMIT_NOFILE, &before), 0);
+    rlimit more = before;
+    more.rlim_cur = std::min<rlim_t>(before.rlim_max, 4096);
+    ASSERT_EQ(::setrlimit(RLIMIT_NOFILE, &more), 0);
+    std::vector<int> open;
+    for (int i = 0; i < 1000; ++i)
+        open.push_back(::open("/dev/null", O_RDONLY | O_CLOEXEC));
+    EXPECT_GE(*std::max_element(open.begin(), open.end()), 1000);
+    expectMerged();
+    for (const int descriptor : open)
+        ::close(descriptor);
+    ::setrlimit(RLIMIT_NOFILE, &before);
+}
+
+TEST_F(MergeDriverHost, MayHaveNoWorkingFolderAnyMore)
+{
+    const fs::path before = fs::current_path();
+    fs::create_directory(folder() / "gone");
+    fs::current_path(folder() / "gone");
+    fs::remove(folder() / "gone");
+    const int code = merge();
+    fs::current_path(before);
+    EXPECT_EQ(code, 0);
+    EXPECT_EQ(staged("file"), "ours\nbase\ntheirs\n");
+}
+
+TEST_F(MergeDriverHost, MayMergeOnAnyThread)
+{
+    std::thread([this] { expectMerged(); }).join();
+}
+
+TEST_F(MergeDriverHost, SplitsTheNamesOfATemporaryFolderThatHasABlank)
+{
+    const fs::path temporary = folder() / "a b";
+    fs::create_directory(temporary);
+    ::setenv("TMPDIR", temporary.c_str(), 1);
+    const std::string out = folder() / "arguments";
+    const std::string program = scripts_.shell("printf '%s|' \"$@\" >" + out + "; exit 0");
+    define("tool", program + " %A");
+    EXPECT_EQ(merge(), 0);
+    EXPECT_TRUE(fs::is_empty(temporary));
+    const std::string split = Scripts::read(out);
+    EXPECT_EQ(
+        split.compare(0, (folder() / "a").string().size() + 1, (folder() / "a").string() + '|'), 0)
+        << split;
+    repository_.git({"reset", "--quiet", "--hard"});
+    define("tool", program + " \"%A\"");
+    EXPECT_EQ(merge(), 0);
+    const std::string whole = Scripts::read(out);
+    EXPECT_EQ(whole.compare(0, temporary.string().size() + 1, temporary.string() + '/'), 0)
+        << whole;
+    EXPECT_EQ(std::count(whole.begin(), whole.end(), '|'), 1) << whole;
+}
+
+TEST_F(MergeDriverHost, FindsAPlaceholderInTheNameOfTheTemporaryFolder)
+{
+    const fs::path temporary = folder() / "a%Pb";
+    fs::create_directory(temporary);
+    ::setenv("TMPDIR", temporary.c_str(), 1);
+    const std::string out = folder() / "arguments";
+    define("tool", scripts_.shell("printf '%s|' \"$@\" >" + out) + " %A");
+    EXPECT_EQ(merge(), 0);
+    const std::string beginning = (folder() / "afileb/").string();
+    EXPECT_EQ(Scripts::read(out).compare(0, beginning.size(), beginning), 0);
+}
+
+TEST_F(MergeDriverHost, RunsTheCommandWithoutFilesWhereNobodyMayWrite)
+{
+    ::setenv("TMPDIR", "/proc", 1);
+    const std::string out = folder() / "found";
+    define("tool", scripts_.shell("ls \"$@\" >" + out + "; echo run >>" + out) + " %O %A %B");
+    EXPECT_EQ(merge(), 0);
+    EXPECT_EQ(Scripts::read(out), "run\n");
+    EXPECT_FALSE(isInConflict("file"));
+    EXPECT_EQ(staged("file"), "");
+}
+
+TEST_F(MergeDriverHost, RunsTheCommandWithoutFilesWhenTheTemporaryFolderIsNotWritable)
+{
+    const fs::path temporary = folder() / "locked";
+    fs::create_directory(temporary);
+    ::setenv("TMPDIR", temporary.c_str(), 1);
+    const std::string out = environment().home() / "found";
+    defineScript("tool", "for f in \"$1\" \"$2\" \"$3\"; do test -e \"$f\" && echo \"$f\" >>" +
+                             out + "; done; echo run >>" + out + "; exit 0");
+    vclink::test::giveToUnprivilegedUser(folder().path());
+    fs::permissions(temporary, fs::perms(0555));
+    const std::string answer = vclink::test::runAsUnprivilegedUser(
+        [this]() -> std::string
+        {
+            const int code = merge();
+            return code == 0 ? std::string() : "git_merge gave " + std::to_string(code);
+        });
+    EXPECT_EQ(answer, "");
+    EXPECT_EQ(Scripts::read(out), "run\n");
+    vclink::test::giveToUnprivilegedUser(folder().path());
+    EXPECT_EQ(vclink::test::runAsUnprivilegedUser([this] { return staged("file"); }), "");
+    EXPECT_EQ(vclink::test::runAsUnprivilegedUser([this] { return repository_.read("file"); }), "");
+}
+
+} // namespace

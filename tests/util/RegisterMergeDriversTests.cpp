@@ -1,0 +1,111 @@
+// SPDX-License-Identifier: MIT
+#include <string>
+#include <utility>
+
+#include <git2.h>
+#include <git2/sys/merge.h>
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include "support/GitTest.hpp"
+#include "support/LibGit2Session.hpp"
+#include "support/LogCapture.hpp"
+#include "util/GitMergeDriverLookup.hpp"
+
+namespace
+{
+
+namespace git = vclink::git;
+using testing::ElementsAre;
+using testing::IsEmpty;
+using vclink::test::LogCapture;
+
+class RegisterMergeDrivers : public vclink::test::GitTest
+{
+  protected:
+    vclink::test::LibGit2Session session_{environment()};
+};
+
+TEST_F(RegisterMergeDrivers, RegistersOneDriverUnderTheWildcard)
+{
+    EXPECT_EQ(git_merge_driver_lookup("*"), nullptr);
+    git::GitMergeDriverLookup lookup = git::registerMergeDrivers();
+    ASSERT_EQ(lookup.size(), 1U);
+    EXPECT_EQ(lookup.begin()->first, "*");
+    EXPECT_EQ(git_merge_driver_lookup("*"), &lookup.at("*"));
+    git::unregisterMergeDrivers(lookup);
+}
+
+TEST_F(RegisterMergeDrivers, FillsTheRecord)
+{
+    git::GitMergeDriverLookup lookup = git::registerMergeDrivers();
+    const git_merge_driver &driver = lookup.at("*");
+    EXPECT_EQ(driver.version, 1U);
+    EXPECT_EQ(driver.initialize, nullptr);
+    EXPECT_EQ(driver.shutdown, nullptr);
+    EXPECT_EQ(driver.apply, &git::wildcardApplyEntry);
+    git::unregisterMergeDrivers(lookup);
+}
+
+TEST_F(RegisterMergeDrivers, KeepsTheRecordsAddressWhenTheLookupIsMoved)
+{
+    git::GitMergeDriverLookup lookup = git::registerMergeDrivers();
+    const git_merge_driver *const address = &lookup.at("*");
+    git::GitMergeDriverLookup assigned;
+    assigned = std::move(lookup);
+    EXPECT_EQ(&assigned.at("*"), address);
+    git::GitMergeDriverLookup constructed(std::move(assigned));
+    EXPECT_EQ(&constructed.at("*"), address);
+    EXPECT_EQ(git_merge_driver_lookup("*"), address);
+    git::unregisterMergeDrivers(constructed);
+}
+
+TEST_F(RegisterMergeDrivers, LeavesTheFirstRegistrationWhenThereIsOne)
+{
+    git::GitMergeDriverLookup first = git::registerMergeDrivers();
+    git::GitMergeDriverLookup second = git::registerMergeDrivers();
+    EXPECT_EQ(second.size(), 1U);
+    EXPECT_EQ(git_merge_driver_lookup("*"), &first.at("*"));
+    git::unregisterMergeDrivers(first);
+}
+
+TEST_F(RegisterMergeDrivers, EndsEveryRegistrationWithAnyLookup)
+{
+    git::GitMergeDriverLookup first = git::registerMergeDrivers();
+    git::GitMergeDriverLookup second = git::registerMergeDrivers();
+    git::unregisterMergeDrivers(second);
+    EXPECT_EQ(git_merge_driver_lookup("*"), nullptr);
+    git::unregisterMergeDrivers(first);
+    EXPECT_EQ(git_merge_driver_lookup("*"), nullptr);
+}
+
+TEST_F(RegisterMergeDrivers, LeavesTheLookupAsItIsAtTheEnd)
+{
+    git::GitMergeDriverLookup lookup = git::registerMergeDrivers();
+    git::unregisterMergeDrivers(lookup);
+    EXPECT_EQ(lookup.size(), 1U);
+    EXPECT_EQ(lookup.at("*").apply, &git::wildcardApplyEntry);
+}
+
+TEST_F(RegisterMergeDrivers, TellsOfEachDriverAtTheEndInTheOrderOfTheirNames)
+{
+    git::GitMergeDriverLookup lookup;
+    for (const char *name : {"b", "*", "a"})
+        lookup[name] = {};
+    const LogCapture log;
+    git::unregisterMergeDrivers(lookup);
+    EXPECT_THAT(log.messages(),
+                ElementsAre("Unregister merge driver: *", "Unregister merge driver: a",
+                            "Unregister merge driver: b"));
+    EXPECT_EQ(log.records().at(0).severity, 0x08U);
+}
+
+TEST_F(RegisterMergeDrivers, TellsNothingOfTheRegistration)
+{
+    const LogCapture log;
+    git::GitMergeDriverLookup lookup = git::registerMergeDrivers();
+    EXPECT_THAT(log.messages(), IsEmpty());
+    git::unregisterMergeDrivers(lookup);
+}
+
+} // namespace

@@ -1,0 +1,220 @@
+// SPDX-License-Identifier: MIT
+// Commands that can't be started, and runs that an exception leaves.
+#include <array>
+#include <cerrno>
+#include <csignal>
+#include <exception>
+#include <stdexcept>
+#include <string>
+
+#include <boost/process/exception.hpp>
+#include <gtest/gtest.h>
+#include <sys/resource.h>
+#include <sys/wait.h>
+#include <unistd.h>
+
+#include "RunCommandTest.hpp"
+#include "support/Descriptors.hpp"
+#include "support/LogCapture.hpp"
+#include "util/runCommand.hpp"
+
+namespace
+{
+
+using vclink::git::runCommand;
+using vclink::test::NothingLeft;
+using vclink::test::RunOutcome;
+
+class RunCommandFailure : public vclink::test::RunCommandTest
+{
+  protected:
+    int errorOf(const std::string &command) const
+    {
+        const RunOutcome outcome = run(command);
+        EXPECT_TRUE(outcome.error) << command << " gave " << outcome.result;
+        return outcome.error.value();
+    }
+};
+
+TEST_F(RunCommandFailure, OfAMissingProgramIsAnError)
+{
+    EXPECT_EQ(errorOf("/nowhere/tool"), ENOENT);
+    EXPECT_EQ(errorOf("no-such-tool-anywhere x"), ENOENT);
+}
+
+TEST_F(RunCommandFailure, OfAProgramThatMayNotRunIsAnError)
+{
+    EXPECT_EQ(errorOf(scripts_.file("#!/bin/sh\n", 0644)), EACCES);
+    EXPECT_EQ(errorOf(folder().path()), EACCES);
+}
+
+TEST_F(RunCommandFailure, OfAProgramWithoutAnInterpreterLineIsAnError)
+{
+    EXPECT_EQ(errorOf(scripts_.file("exit 0\n", 0755)), ENOEXEC);
+    EXPECT_EQ(errorOf(scripts_.file("", 0755)), ENOEXEC);
+}
+
+TEST_F(RunCommandFailure, OfAProgramWhoseInterpreterIsMissingIsAnError)
+{
+    EXPECT_EQ(errorOf(scripts_.file("#!/nowhere/sh\n", 0755)), ENOENT);
+}
+
+TEST_F(RunCommandFailure, OfAWordThatIsTooLongIsAnError)
+{
+    EXPECT_EQ(errorOf("/bin/true " + std::string(200'000, 'x')), E2BIG);
+}
+
+TEST_F(RunCommandFailure, OfAnEmptyCommandIsAnError)
+{
+    for (const char *command : {"", " ", "    "})
+        EXPECT_EQ(errorOf(command), EINVAL) << '\'' << command << '\'';
+    EXPECT_EQ(errorOf("\"\""), EACCES);
+}
+
+TEST_F(RunCommandFailure, OfACommandThatPlaceholdersEmptyIsAnError)
+{
+    const NothingLeft check(environment().temporary());
+    EXPECT_THROW(runCommand("%A%B", {{"%A", ""}, {"%B", " "}}), boost::process::process_error);
+}
+
+TEST_F(RunCommandFailure, OfALoneQuoteIsAnError)
+{
+    for (const char *command : {"\"", "/bin/true \"", " \""})
+        EXPECT_EQ(errorOf(command), EINVAL) << command;
+}
+
+TEST_F(RunCommandFailure, OfAnEmptyEnvironmentIsAnError)
+{
+    const auto runWithoutEnvironment = [](const std::string &command)
+    {
+        ::clearenv();
+        std::array<char *, 1> none{nullptr};
+        environ = none.data();
+        try
+        {
+            runCommand(command, {});
+        }
+        catch (const boost::process::process_error &error)
+        {
+            ::_exit(error.code().value());
+        }
+        ::_exit(0);
+    };
+    EXPECT_EXIT(runWithoutEnvironment("/bin/true"), testing::ExitedWithCode(EINVAL), "");
+    EXPECT_EXIT(runWithoutEnvironment("true"), testing::ExitedWithCode(EINVAL), "");
+}
+
+TEST_F(RunCommandFailure, LeavesNothingHoweverOftenItHappens)
+{
+    const NothingLeft check(environment().temporary());
+    for (int i = 0; i < 50; ++i)
+        EXPECT_THROW(runCommand("/nowhere/tool", {}), boost::process::process_error);
+}
+
+TEST_F(RunCommandFailure, LeavesTheOtherChildrenOfTheProcess)
+{
+    const pid_t child = ::fork();
+    if (child == 0)
+        ::_exit(9);
+    siginfo_t info = {};
+    ASSERT_EQ(::waitid(P_PID, static_cast<id_t>(child), &info, WEXITED | WNOWAIT), 0);
+    EXPECT_THROW(runCommand("/nowhere/tool", {}), boost::process::process_error);
+    EXPECT_EQ(runCommand("/bin/true", {}), 0);
+    int status = 0;
+    EXPECT_EQ(::waitpid(child, &status, WNOHANG), child);
+    EXPECT_EQ(WEXITSTATUS(status), 9);
+}
+
+TEST_F(RunCommandFailure, OfThePipeIsAnErrorWithoutARecord)
+{
+    // The sanitizers need a descriptor for the first exception of a kind.
+    EXPECT_EQ(errorOf(""), EINVAL);
+    const vclink::test::LogCapture log(0x08);
+    rlimit before{};
+    ASSERT_EQ(::getrlimit(RLIMIT_NOFILE, &before), 0);
+    rlimit none = before;
+    none.rlim_cur = 0;
+    ASSERT_EQ(::setrlimit(RLIMIT_NOFILE, &none), 0);
+    std::exception_ptr raised;
+    try
+    {
+        runCommand("/bin/true", {});
+    }
+    catch (...)
+    {
+        raised = std::current_exception();
+    }
+    ASSERT_EQ(::setrlimit(RLIMIT_NOFILE, &before), 0);
+    EXPECT_TRUE(log.messages().empty());
+    ASSERT_NE(raised, nullptr);
+    try
+    {
+        std::rethrow_exception(raised);
+    }
+    catch (const boost::process::process_error &error)
+    {
+        EXPECT_EQ(error.code(), std::error_code(EMFILE, std::system_category()));
+    }
+}
+
+TEST_F(RunCommandFailure, LeavesNothingAtAnyNumberOfDescriptorsLeft)
+{
+    EXPECT_EQ(errorOf(""), EINVAL);
+    const NothingLeft check(environment().temporary());
+    rlimit before{};
+    ASSERT_EQ(::getrlimit(RLIMIT_NOFILE, &before), 0);
+    const int highest = vclink::test::openDescriptors().rbegin()->first;
+    bool hasRun = false;
+    for (rlim_t extra = 1; extra < 16 && !hasRun; ++extra)
+    {
+        rlimit few = before;
+        few.rlim_cur = static_cast<rlim_t>(highest) + extra;
+        ASSERT_EQ(::setrlimit(RLIMIT_NOFILE, &few), 0);
+        try
+        {
+            hasRun = runCommand("/bin/true", {}) == 0;
+        }
+        catch (const boost::process::process_error &error)
+        {
+            EXPECT_EQ(error.code().value(), EMFILE) << extra;
+        }
+        ASSERT_EQ(::setrlimit(RLIMIT_NOFILE, &before), 0);
+    }
+    EXPECT_TRUE(hasRun);
+}
+
+TEST_F(RunCommandFailure, EndsACommandThatAnExceptionLeaves)
+{
+    const std::string identity = scripts_.folder() / "identity";
+    // The empty line ends the reading while the command runs.
+    const std::string program =
+        scripts_.shell("echo $$ >" + identity + "; echo; while :; do sleep 60; done");
+    {
+        const NothingLeft check(environment().temporary());
+        vclink::test::LogCapture log(0x08);
+        log.onRecord(
+            [](const vclink::test::LogRecord &record)
+            {
+                if (record.message.compare(0, 8, "Output:\n") == 0)
+                    throw std::domain_error("sink");
+            });
+        EXPECT_THROW(runCommand(program, {}), std::domain_error);
+    }
+    const std::string process = vclink::test::Scripts::read(identity);
+    ASSERT_FALSE(process.empty());
+    EXPECT_EQ(::kill(std::stoi(process), 0), -1);
+    EXPECT_EQ(errno, ESRCH);
+}
+
+TEST_F(RunCommandFailure, StartsNothingWhenTheRecordOfTheCommandFails)
+{
+    const NothingLeft check(environment().temporary());
+    const std::string mark = scripts_.folder() / "mark";
+    const std::string program = scripts_.shell("echo started >" + mark);
+    vclink::test::LogCapture log(0x08);
+    log.onRecord([](const vclink::test::LogRecord &) { throw std::domain_error("sink"); });
+    EXPECT_THROW(runCommand(program, {}), std::domain_error);
+    EXPECT_EQ(vclink::test::Scripts::read(mark), "");
+}
+
+} // namespace

@@ -1,0 +1,164 @@
+// SPDX-License-Identifier: MIT
+#include <csignal>
+#include <cstdlib>
+#include <filesystem>
+#include <stdexcept>
+#include <string>
+
+#include <git2.h>
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+#include <sys/resource.h>
+#include <sys/stat.h>
+
+#include "NothingLeft.hpp"
+#include "Scripts.hpp"
+#include "SignalAction.hpp"
+#include "error/errorUtil/GitResult.hpp"
+#include "support/GitTest.hpp"
+#include "support/LibGit2Session.hpp"
+#include "support/LogCapture.hpp"
+#include "support/text.hpp"
+#include "util/temporaryFile.hpp"
+#include "vclink/git/LibGit2Exception.hpp"
+
+namespace
+{
+
+namespace fs = std::filesystem;
+namespace git = vclink::git;
+using testing::IsEmpty;
+using testing::StartsWith;
+using vclink::test::asBytes;
+using vclink::test::asPath;
+using vclink::test::LogCapture;
+using vclink::test::LogRecord;
+using vclink::test::Scripts;
+
+class TemporaryFile : public vclink::test::GitTest
+{
+  protected:
+    static std::string write(const std::string &bytes)
+    {
+        return asBytes(git::writeTemporaryFile(bytes.data(), bytes.size()));
+    }
+};
+
+TEST_F(TemporaryFile, HoldsTheBytes)
+{
+    for (const std::string &bytes : {std::string(), std::string("text\r\n"),
+                                     std::string("\0\377\n", 3), std::string(1'000'000, 'x')})
+        EXPECT_EQ(Scripts::read(write(bytes)), bytes);
+}
+
+TEST_F(TemporaryFile, StandsInTheTemporaryFolderUnderANewName)
+{
+    const fs::path first = write("1");
+    const fs::path second = write("2");
+    EXPECT_EQ(first.parent_path(), environment().temporary());
+    EXPECT_EQ(second.parent_path(), environment().temporary());
+    EXPECT_NE(first, second);
+    EXPECT_EQ(first.extension(), "");
+}
+
+TEST_F(TemporaryFile, IsItsOwnersAlone)
+{
+    const std::string file = write("secret");
+    EXPECT_EQ(fs::status(file).permissions(), fs::perms(0600));
+}
+
+TEST_F(TemporaryFile, HasANameEvenWhenItCannotBeWritten)
+{
+    ::setenv("TMPDIR", "/proc", 1);
+    const std::string file = write("bytes");
+    EXPECT_THAT(file, StartsWith("/proc/"));
+    EXPECT_FALSE(fs::exists(file));
+}
+
+TEST_F(TemporaryFile, KeepsQuietAboutBytesThatDoNotFit)
+{
+    const vclink::test::SignalAction ignored(SIGXFSZ, SIG_IGN);
+    rlimit before{};
+    ASSERT_EQ(::getrlimit(RLIMIT_FSIZE, &before), 0);
+    rlimit small = before;
+    small.rlim_cur = 1000;
+    ASSERT_EQ(::setrlimit(RLIMIT_FSIZE, &small), 0);
+    const std::string file = write(std::string(100'000, 'x'));
+    ::setrlimit(RLIMIT_FSIZE, &before);
+    EXPECT_LE(fs::file_size(file), 1000U);
+}
+
+TEST_F(TemporaryFile, HoldsABlob)
+{
+    const vclink::test::LibGit2Session session(environment());
+    auto repository = makeRepository();
+    repository.write("file", std::string("a\r\n\0b", 5));
+    repository.commitAll("commit");
+    const auto opened =
+        git::acquire<git_repository>(git_repository_open, repository.path().c_str()).value();
+    git_index_entry entry = {};
+    git_oid_fromstr(&entry.id, repository.line({"rev-parse", "HEAD:file"}).c_str());
+    const upath file = git::writeBlobToTemporaryFile(entry, opened.get());
+    EXPECT_EQ(Scripts::read(asBytes(file)), std::string("a\r\n\0b", 5));
+}
+
+TEST_F(TemporaryFile, IsNotMadeForABlobThatIsMissing)
+{
+    const vclink::test::LibGit2Session session(environment());
+    const auto repository = makeRepository();
+    const auto opened =
+        git::acquire<git_repository>(git_repository_open, repository.path().c_str()).value();
+    const vclink::test::NothingLeft check(environment().temporary());
+    git_index_entry entry = {};
+    git_oid_fromstr(&entry.id, std::string(40, '1').c_str());
+    try
+    {
+        git::writeBlobToTemporaryFile(entry, opened.get());
+        FAIL() << "no exception";
+    }
+    catch (const git::LibGit2Exception &exception)
+    {
+        EXPECT_EQ(exception.getError().getCode(), GIT_ENOTFOUND);
+    }
+}
+
+TEST_F(TemporaryFile, IsRemoved)
+{
+    const std::string file = write("bytes");
+    git::removeTemporaryFile(asPath(file));
+    EXPECT_FALSE(fs::exists(file));
+}
+
+TEST_F(TemporaryFile, MayBeGoneAlreadyWithoutAWord)
+{
+    const LogCapture log;
+    git::removeTemporaryFile(asPath(folder() / "missing"));
+    EXPECT_THAT(log.messages(), IsEmpty());
+}
+
+TEST_F(TemporaryFile, ThatCannotBeRemovedIsToldOfAndLeft)
+{
+    const std::string file = folder() / "full";
+    fs::create_directories(file + "/sub");
+    const LogCapture log;
+    git::removeTemporaryFile(asPath(file));
+    ASSERT_EQ(log.records().size(), 2U);
+    EXPECT_EQ(log.records()[0].severity, 0x10U);
+    EXPECT_THAT(log.records()[0].message, StartsWith("Exception caught: "));
+    EXPECT_THAT(log.records()[0].message, testing::HasSubstr("filesystem_error"));
+    EXPECT_EQ(log.records()[1].severity, 0x200U);
+    EXPECT_EQ(log.records()[1].message, "Could not remove temporary file: " + file);
+    EXPECT_TRUE(fs::exists(file));
+}
+
+TEST_F(TemporaryFile, IsRemovedWithoutAnExceptionEvenWhenTheLogRaises)
+{
+    const std::string file = folder() / "full";
+    fs::create_directories(file + "/sub");
+    LogCapture log;
+    log.onRecord([](const LogRecord &) { throw std::runtime_error("sink"); });
+    git::removeTemporaryFile(asPath(file));
+    EXPECT_EQ(log.records().size(), 1U);
+}
+
+} // namespace

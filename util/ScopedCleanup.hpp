@@ -1,0 +1,27 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <functional>
+#include <utility>
+
+namespace vclink::git
+{
+
+/// Runs a function at the end of a scope, on every way out of it. Nothing for an empty function.
+/// What the function raises is dropped.
+class ScopedCleanup
+{
+  public:
+    ScopedCleanup() = default;
+    explicit ScopedCleanup(std::function<void()> cleanup) : cleanup_(std::move(cleanup))
+    {
+    }
+    ScopedCleanup(const ScopedCleanup &) = delete;
+    ScopedCleanup &operator=(const ScopedCleanup &) = delete;
+    ~ScopedCleanup();
+
+  private:
+    std::function<void()> cleanup_;
+};
+
+} // namespace vclink::git

@@ -1,0 +1,67 @@
+// SPDX-License-Identifier: MIT
+#include "util/commandLine.hpp"
+
+#include <cstddef>
+
+#include <boost/algorithm/string/replace.hpp>
+#include <unistd.h>
+
+namespace vclink::git
+{
+namespace
+{
+
+constexpr char blank = ' ';
+constexpr char quote = '"';
+
+/// Where the last word begins: behind the last blank outside double quotes.
+std::size_t findLastWord(const std::string &command) noexcept
+{
+    std::size_t begin = 0;
+    bool isQuoted = false;
+    for (std::size_t i = 0; i < command.size(); ++i)
+    {
+        if (command[i] == quote)
+        {
+            isQuoted = !isQuoted;
+        }
+        else if (command[i] == blank && !isQuoted)
+        {
+            begin = i + 1;
+        }
+    }
+    return begin;
+}
+
+} // namespace
+
+std::string expandPlaceholders(const std::string &commandTemplate,
+                               const std::map<std::string, std::string> &placeholders)
+{
+    std::string command = commandTemplate;
+    for (const auto &[placeholder, value] : placeholders)
+    {
+        boost::algorithm::replace_all(command, placeholder, value);
+    }
+    return command;
+}
+
+const char *findCommandFault(const std::string &command) noexcept
+{
+    if (command.find_first_not_of(blank) == std::string::npos)
+    {
+        return "the command is empty";
+    }
+    // It can only be the last word, since a quote that is not closed takes all that follows.
+    if (command.back() == quote && findLastWord(command) == command.size() - 1)
+    {
+        return "a double quote of the command is not closed";
+    }
+    if (environ == nullptr || *environ == nullptr)
+    {
+        return "the environment is empty";
+    }
+    return nullptr;
+}
+
+} // namespace vclink::git

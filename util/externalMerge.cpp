@@ -1,0 +1,115 @@
+// SPDX-License-Identifier: MIT
+#include "util/externalMerge.hpp"
+
+#include <array>
+#include <cstdio>
+#include <cstring>
+#include <iterator>
+#include <map>
+#include <vector>
+
+#include <git2/buffer.h>
+#include <git2/errors.h>
+
+#include "error/errorUtil/GitResult.hpp"
+#include "error/logging/logger.hpp"
+#include "fl/filesystem/fstream.hpp"
+#include "fl/i18n/convert.hpp"
+#include "util/ScopedCleanup.hpp"
+#include "util/runCommand.hpp"
+#include "util/temporaryFile.hpp"
+
+namespace vclink::git
+{
+namespace
+{
+
+std::string formatMarkerSize(unsigned short size)
+{
+    std::array<char, 8> text{};
+    std::snprintf(text.data(), text.size(), "%d", size);
+    return text.data();
+}
+
+/// A temporary file with one side's content, removed at its end.
+class SideFile
+{
+  public:
+    SideFile(const git_index_entry &entry, git_repository *repository)
+        : path_(writeBlobToTemporaryFile(entry, repository)),
+          cleanup_([this] { removeTemporaryFile(path_); })
+    {
+    }
+    SideFile(const SideFile &) = delete;
+    SideFile &operator=(const SideFile &) = delete;
+    ~SideFile() = default;
+
+    const upath &path() const
+    {
+        return path_;
+    }
+    std::string narrowPath() const
+    {
+        return fl::i18n::to_string(path_.string());
+    }
+
+  private:
+    upath path_;
+    ScopedCleanup cleanup_;
+};
+
+/// An unreadable file counts as an empty one, which is meant.
+std::vector<char> readFile(const upath &file)
+{
+    fl::filesystem::basic_ifstream<char> stream(file.string(),
+                                                std::ios_base::in | std::ios_base::binary);
+    return std::vector<char>(std::istreambuf_iterator<char>(stream),
+                             std::istreambuf_iterator<char>());
+}
+
+} // namespace
+
+MergeSides::MergeSides(const git_merge_driver_source *source)
+    : ancestor(git_merge_driver_source_ancestor(source)),
+      ours(git_merge_driver_source_ours(source)), theirs(git_merge_driver_source_theirs(source)),
+      options(git_merge_driver_source_file_options(source))
+{
+}
+
+const char *MergeSides::resultPath() const noexcept
+{
+    return std::strcmp(ancestor->path, ours->path) == 0 ? theirs->path : ours->path;
+}
+
+std::uint32_t MergeSides::resultMode() const noexcept
+{
+    return ancestor->mode == ours->mode ? theirs->mode : ours->mode;
+}
+
+int runExternalMerge(const std::string &command, const MergeSides &sides,
+                     git_repository *repository, const MergedFile &merged)
+{
+    const SideFile ancestor(*sides.ancestor, repository);
+    const SideFile ours(*sides.ours, repository);
+    const SideFile theirs(*sides.theirs, repository);
+    const std::map<std::string, std::string> placeholders{
+        {"%O", ancestor.narrowPath()},
+        {"%A", ours.narrowPath()},
+        {"%B", theirs.narrowPath()},
+        {"%L", formatMarkerSize(sides.options->marker_size)},
+        {"%P", sides.resultPath()}};
+    if (runCommand(command, placeholders) != 0)
+    {
+        writeRecord(SeverityDiagnostic, "Auto-merge unsuccessful");
+        return GIT_EMERGECONFLICT;
+    }
+    writeRecord(SeverityDiagnostic, "Auto-merge successful");
+    const std::vector<char> result = readFile(ours.path());
+    makeResult(git_buf_set(merged.content, result.data(), result.size())).value();
+    // Only now: a driver that fails leaves these as they were.
+    *merged.path = sides.resultPath();
+    *merged.mode = sides.resultMode();
+    return 0;
+}
+
+} // namespace vclink::git

@@ -1,0 +1,137 @@
+// SPDX-License-Identifier: MIT
+#include "util/runCommand.hpp"
+
+#include <array>
+#include <cerrno>
+#include <sstream>
+#include <system_error>
+
+#include <boost/process/child.hpp>
+#include <boost/process/env.hpp>
+#include <boost/process/exception.hpp>
+#include <boost/process/io.hpp>
+#include <boost/process/pipe.hpp>
+#include <fcntl.h>
+#include <unistd.h>
+
+#include "error/logging/logger.hpp"
+#include "util/ChildStatus.hpp"
+#include "util/StartGuard.hpp"
+#include "util/commandLine.hpp"
+
+namespace vclink::git
+{
+namespace
+{
+
+namespace process = boost::process;
+
+void raiseIfError(const std::error_code &error, const char *text)
+{
+    if (error)
+    {
+        throw process::process_error(error, text);
+    }
+}
+
+std::error_code lastError()
+{
+    return std::error_code(errno, std::system_category());
+}
+
+/// Moves a descriptor off the numbers of the standard streams, which a host may have closed: the
+/// child's own streams would come in its way there.
+int moveOffStandardStreams(int descriptor)
+{
+    if (descriptor < 0 || descriptor > STDERR_FILENO)
+    {
+        return descriptor;
+    }
+    const int moved = ::fcntl(descriptor, F_DUPFD_CLOEXEC, STDERR_FILENO + 1);
+    const std::error_code error = lastError();
+    ::close(descriptor);
+    raiseIfError(moved < 0 ? error : std::error_code(), "fcntl(2) failed");
+    return moved;
+}
+
+/// A pipe that no other command inherits: one that another thread starts meanwhile would hold this
+/// one's output open.
+process::pipe makePipe()
+{
+    std::array<int, 2> ends{};
+    if (::pipe2(ends.data(), O_CLOEXEC) != 0)
+    {
+        raiseIfError(lastError(), "pipe2(2) failed");
+    }
+    process::pipe pipe(ends[0], ends[1]);
+    pipe.assign_source(-1);
+    pipe.assign_source(moveOffStandardStreams(ends[0]));
+    pipe.assign_sink(-1);
+    pipe.assign_sink(moveOffStandardStreams(ends[1]));
+    return pipe;
+}
+
+void refuseUnusable(const std::string &command)
+{
+    const char *const fault = findCommandFault(command);
+    if (fault != nullptr)
+    {
+        raiseIfError(std::make_error_code(std::errc::invalid_argument), fault);
+    }
+    if (!isChildStatusKept())
+    {
+        raiseIfError(std::error_code(ECHILD, std::system_category()),
+                     "the process ignores SIGCHLD, so that no exit status can be known");
+    }
+}
+
+bool isRunning(ChildStatus &status)
+{
+    std::error_code error;
+    const bool running = status.isRunning(error);
+    raiseIfError(error, "the command's exit status can't be known");
+    return running;
+}
+
+int waitFor(ChildStatus &status)
+{
+    std::error_code error;
+    const int result = status.wait(error);
+    raiseIfError(error, "the command's exit status can't be known");
+    return result;
+}
+
+std::string readOutput(process::ipstream &output, ChildStatus &status)
+{
+    std::ostringstream collected;
+    for (std::string line; isRunning(status) && std::getline(output, line) && !line.empty();)
+    {
+        collected << line;
+    }
+    return collected.str();
+}
+
+} // namespace
+
+int runCommand(const std::string &commandTemplate,
+               const std::map<std::string, std::string> &placeholders)
+{
+    const std::string command = expandPlaceholders(commandTemplate, placeholders);
+    process::ipstream output(makePipe());
+    writeRecord(SeverityDiagnostic, "Command: ", command);
+    refuseUnusable(command);
+    StartGuard guard(output.pipe().native_source(), output.pipe().native_sink());
+    process::child child(command, process::std_out > output, process::std_err > process::null,
+                         boost::this_process::environment());
+    guard.hasStarted(child.id());
+    ChildStatus status(child.id());
+    writeRecord(SeverityDiagnostic, "Output:\n", readOutput(output, status));
+    const int result = waitFor(status);
+    // Another waiter in the process may have been faster; the status is known.
+    std::error_code ignored;
+    child.wait(ignored);
+    guard.hasEnded();
+    return result;
+}
+
+} // namespace vclink::git

@@ -1,0 +1,77 @@
+// SPDX-License-Identifier: MIT
+#include "util/temporaryFile.hpp"
+
+#include <git2/odb.h>
+#include <git2/repository.h>
+
+#include "error/errorUtil/GitResult.hpp"
+#include "error/errorUtil/diagnosticText.hpp"
+#include "error/logging/logger.hpp"
+#include "fl/filesystem/detail/path_text.hpp"
+#include "fl/filesystem/fstream.hpp"
+#include "fl/filesystem/operations.hpp"
+#include "fl/i18n/convert.hpp"
+#include "util/ScopedCleanup.hpp"
+
+namespace vclink::git
+{
+
+namespace
+{
+
+void writeFile(const upath &file, const void *data, std::size_t size)
+{
+    fl::filesystem::basic_ofstream<char> stream(
+        fl::filesystem::detail::make_native_access_form(file.string()),
+        std::ios_base::out | std::ios_base::binary);
+    // The state of the stream is not looked at, which is meant: the command then meets what is
+    // there.
+    stream.write(static_cast<const char *>(data), static_cast<std::streamsize>(size));
+    stream.close();
+}
+
+} // namespace
+
+upath writeTemporaryFile(const void *data, std::size_t size)
+{
+    upath file(fl::filesystem::tmpnam({}, {}, {}));
+    try
+    {
+        writeFile(file, data, size);
+    }
+    catch (...)
+    {
+        removeTemporaryFile(file);
+        throw;
+    }
+    return file;
+}
+
+upath writeBlobToTemporaryFile(const git_index_entry &entry, git_repository *repository)
+{
+    const OwnedHandle<git_odb> database = acquire<git_odb>(git_repository_odb, repository).value();
+    const OwnedHandle<git_odb_object> blob =
+        acquire<git_odb_object>(git_odb_read, database.get(), &entry.id).value();
+    return writeTemporaryFile(git_odb_object_data(blob.get()), git_odb_object_size(blob.get()));
+}
+
+void removeTemporaryFile(const upath &file) noexcept
+{
+    try
+    {
+        fl::filesystem::remove(file);
+    }
+    catch (...)
+    {
+        // What the log's sinks raise is dropped as well: this runs while a scope is left.
+        const ScopedCleanup report(
+            [&file]
+            {
+                writeRecord(SeverityException, "Exception caught: ", currentDiagnosticText);
+                writeRecord(SeverityStackTrace, "Could not remove temporary file: ",
+                            [&file] { return fl::i18n::to_string(file.string()); });
+            });
+    }
+}
+
+} // namespace vclink::git
