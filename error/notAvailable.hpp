@@ -9,13 +9,7 @@ namespace vclink::git
 
 /// The operations that stand in the interfaces and that this build does not carry out yet.
 inline constexpr std::array slotsNotAvailable{
-    std::string_view("GitAdapter::commit"),
-    std::string_view("GitAdapter::addFiles"),
-    std::string_view("GitAdapter::removeFiles"),
-    std::string_view("GitAdapter::revertFiles"),
-    std::string_view("GitAdapter::markResolved"),
     std::string_view("GitAdapterFactory::createWorkingCopyGenerator"),
-    std::string_view("toGitCheckoutOptions"),
     std::string_view("toGitRemoteCallbacks"),
     std::string_view("toGitFetchOptions"),
     std::string_view("toGitPushOptions"),

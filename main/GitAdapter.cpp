@@ -3,7 +3,6 @@
 
 #include <utility>
 
-#include "error/notAvailable.hpp"
 #include "util/repository.hpp"
 
 namespace vclink::git
@@ -23,31 +22,6 @@ GitAdapter::GitAdapter(const upath &root, std::shared_ptr<GitOptionsFactory> fac
 }
 
 GitAdapter::~GitAdapter() = default;
-
-void GitAdapter::commit(const upath & /*folder*/, const ustring & /*message*/)
-{
-    raiseNotAvailable();
-}
-
-void GitAdapter::addFiles(const std::vector<upath> & /*files*/)
-{
-    raiseNotAvailable();
-}
-
-void GitAdapter::removeFiles(const std::vector<upath> & /*files*/)
-{
-    raiseNotAvailable();
-}
-
-void GitAdapter::revertFiles(const std::vector<upath> & /*files*/)
-{
-    raiseNotAvailable();
-}
-
-void GitAdapter::markResolved(const upath & /*file*/)
-{
-    raiseNotAvailable();
-}
 
 const upath &GitAdapter::getRootFolder()
 {

@@ -49,6 +49,12 @@ class GitAdapter : public vclink::CMAdapter
 
   private:
     FileStateMap collectFileStates(char **pathspecStrings, std::size_t pathspecCount);
+    void addToIndex(const std::vector<upath> &files);
+    void removeFromIndex(const std::vector<upath> &files);
+    void createCommit(git_repository *repository, const ustring &message,
+                      const std::vector<const git_commit *> &parents);
+    /// @return the states that it looked at
+    FileStateMap throwIfConflicted(const std::vector<upath> &files);
 
     // The guard comes first and goes last: all use of libgit2 by the other members ends before it.
     LibGit2Guard guard_;

@@ -48,11 +48,6 @@ RemoteCallbacks::RemoteCallbacks(ApplicationInteractor &interactor)
 {
 }
 
-CheckoutCallbacks::CheckoutCallbacks(ApplicationInteractor &interactor)
-    : interactor_(interactor), poller_(interactor)
-{
-}
-
 GitCallbacks::GitCallbacks(std::shared_ptr<ApplicationInteractor> interactor)
     : interactor_(std::move(interactor))
 {

@@ -2,6 +2,7 @@
 #include "options/gitRecords.hpp"
 
 #include "error/notAvailable.hpp"
+#include "options/Callbacks.hpp"
 
 namespace vclink::git
 {
@@ -17,10 +18,21 @@ git_merge_options toGitMergeOptions(const MergeOptions & /*options*/)
     return initGitRecord(git_merge_options_init, unsigned{GIT_MERGE_OPTIONS_VERSION});
 }
 
-git_checkout_options toGitCheckoutOptions(const CheckoutOptions & /*options*/,
-                                          CheckoutCallbacks & /*callbacks*/)
+git_checkout_options toGitCheckoutOptions(const CheckoutOptions &options,
+                                          CheckoutCallbacks &callbacks)
 {
-    raiseNotAvailable();
+    git_checkout_options record =
+        initGitRecord(git_checkout_options_init, unsigned{GIT_CHECKOUT_OPTIONS_VERSION});
+    record.checkout_strategy = static_cast<unsigned>(options.checkoutStrategy);
+    record.notify_flags = GIT_CHECKOUT_NOTIFY_ALL;
+    record.notify_cb = makeCallback<&CheckoutCallbacks::notifyProgress, git_checkout_notify_cb>();
+    record.notify_payload = &callbacks;
+    record.progress_cb =
+        makeCallback<&CheckoutCallbacks::checkoutProgress, git_checkout_progress_cb>();
+    record.progress_payload = &callbacks;
+    record.perfdata_cb = makeCallback<&CheckoutCallbacks::perfData, git_checkout_perfdata_cb>();
+    record.perfdata_payload = &callbacks;
+    return record;
 }
 
 git_remote_callbacks toGitRemoteCallbacks(RemoteCallbacks & /*callbacks*/)

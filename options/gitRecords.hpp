@@ -39,6 +39,9 @@ git_proxy_options toGitProxyOptions(const ProxyOptions &options, ProxyCallbacks 
 /// git_merge_options_init; nothing of the value is read.
 git_merge_options toGitMergeOptions(const MergeOptions &options);
 
+/// git_checkout_options_init. The strategy's low 32 bits, all notifications, and the three
+/// callbacks with `callbacks` as their payload; the rest stays as libgit2 initialised it. A list of
+/// paths is the caller's to fill in.
 git_checkout_options toGitCheckoutOptions(const CheckoutOptions &options,
                                           CheckoutCallbacks &callbacks);
 git_remote_callbacks toGitRemoteCallbacks(RemoteCallbacks &callbacks);

@@ -131,10 +131,12 @@ TEST_F(Exported, LibraryLogsUnderItsNameToTheHostsSinks)
     const LogCapture log(0x20 | 0x08 | 0x40);
     EXPECT_THROW(factory.isAdapterFor(brokenFolder()), LibGit2Exception);
     const auto records = log.records();
-    ASSERT_EQ(records.size(), 3u);
+    ASSERT_EQ(records.size(), 4u);
     EXPECT_THAT(records[0].message, HasSubstr("GitErrorPolicy::throwIfError"));
     EXPECT_THAT(records[1].message, testing::StartsWith("Throwing error "));
     EXPECT_THAT(records[2].message, testing::EndsWith(" [throw]"));
+    // The probe's guard ends.
+    EXPECT_EQ(records[3].message, "Unregister merge driver: *");
 }
 
 TEST_F(Exported, TagExceptionIsCaughtByItsIdentifier)

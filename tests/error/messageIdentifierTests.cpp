@@ -12,8 +12,8 @@
 #include "error/raise.hpp"
 #include "fl/i18n/MessageCatalog.hpp"
 #include "fl/i18n/VkLocale.hpp"
+#include "support/LocaleOfTheProcess.hpp"
 #include "vclink/git/GitException.hpp"
-#include "vclink_host/locale.hpp"
 
 namespace vclink::git
 {
@@ -24,27 +24,9 @@ using namespace shared_vclink::git;
 using fl::i18n::VkLocale;
 using resource_core::BaseMsgID;
 using resource_core::MsgArgument;
+using test::LocaleOfTheProcess;
 
 static_assert(std::is_same_v<MsgArgument, boost::variant<long, std::string, ustring>>);
-
-/// Sets the process's locale for the life of the object.
-class LocaleOfTheProcess
-{
-  public:
-    explicit LocaleOfTheProcess(const std::string &name)
-    {
-        vclink_host::setGlobalLocale(VkLocale(name));
-    }
-    LocaleOfTheProcess(const LocaleOfTheProcess &) = delete;
-    LocaleOfTheProcess &operator=(const LocaleOfTheProcess &) = delete;
-    ~LocaleOfTheProcess()
-    {
-        vclink_host::setGlobalLocale(before_);
-    }
-
-  private:
-    VkLocale before_ = VkLocale::global();
-};
 
 void expectMessage(const BaseMsgID &message, const std::string &key,
                    const std::vector<MsgArgument> &arguments)

@@ -8,6 +8,7 @@
 #include "LibGit2Calls.hpp"
 #include "main/libgit2Features.hpp"
 #include "support/GitTest.hpp"
+#include "support/LibGit2Session.hpp"
 #include "support/TestInteractor.hpp"
 #include "support/text.hpp"
 #include "vclink/git/GitAdapterFactory.hpp"
@@ -30,6 +31,8 @@ class FailingLibGit2 : public vclink::test::GitTest
 
 TEST_F(FailingLibGit2, GoesUnnoticedByAGuard)
 {
+    // The guard registers its driver all the same, which a libgit2 that never ends would keep.
+    const vclink::test::LibGit2Session session(environment());
     LibGit2Calls calls;
     calls.onInit = [] { return -1; };
     calls.onShutdown = [] { return -1; };

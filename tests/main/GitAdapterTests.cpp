@@ -13,12 +13,14 @@
 #include "TestOptionsFactory.hpp"
 #include "support/Descriptors.hpp"
 #include "support/text.hpp"
+#include "vclink/exception/SourceControlException.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
 
 namespace
 {
 
 using vclink::ApplicationInteractor;
+using vclink::exception::SourceControlException;
 using vclink::git::GitAdapter;
 using vclink::git::LibGit2Exception;
 using vclink::test::asPath;
@@ -69,8 +71,10 @@ TEST_F(GitAdapterTest, GivesTheRootAfterAnyOperation)
     adapter->getFileStates({asPath(given + "file")});
     adapter->getFileStates({});
     adapter->getFolderStates(root);
-    EXPECT_THROW(adapter->commit(root, u"message"), LibGit2Exception);
-    EXPECT_THROW(adapter->addFiles({root}), LibGit2Exception);
+    adapter->addFiles({asPath(given + "file")});
+    EXPECT_THROW(adapter->addFiles({asPath(given + "file")}), SourceControlException);
+    EXPECT_THROW(adapter->commit(root, u"message"), SourceControlException);
+    adapter->revertFiles({asPath(given + "file")});
     EXPECT_EQ(asUtf8(adapter->getRootFolder().string()), given);
 }
 

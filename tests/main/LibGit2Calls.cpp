@@ -2,6 +2,7 @@
 #include "LibGit2Calls.hpp"
 
 #include <stdexcept>
+#include <utility>
 
 #include <dlfcn.h>
 
@@ -9,6 +10,7 @@ namespace
 {
 
 vclink::test::LibGit2Calls *current = nullptr;
+int depth = 0;
 
 template <class Function> Function *findReal(const char *name)
 {
@@ -18,10 +20,79 @@ template <class Function> Function *findReal(const char *name)
     return reinterpret_cast<Function *>(symbol);
 }
 
-void note(const char *name)
+/// A call that passes through, noted unless libgit2 makes it of itself.
+class Passing
 {
-    if (current != nullptr)
-        current->names.emplace_back(name);
+  public:
+    explicit Passing(const char *name) : isNoted_(current != nullptr && depth == 0)
+    {
+        if (isNoted_)
+            current->names.emplace_back(name);
+        ++depth;
+    }
+    Passing(const Passing &) = delete;
+    Passing &operator=(const Passing &) = delete;
+    ~Passing()
+    {
+        --depth;
+    }
+
+    bool isNoted() const noexcept
+    {
+        return isNoted_;
+    }
+
+  private:
+    bool isNoted_;
+};
+
+/// @return the code to answer instead of calling libgit2, or 0
+int injected(const Passing &passing, const char *name)
+{
+    if (!passing.isNoted())
+        return 0;
+    const auto found = current->failing.find(name);
+    if (found == current->failing.end())
+        return 0;
+    git_error_set_str(GIT_ERROR_OS, "injected");
+    return found->second;
+}
+
+template <class Function, class... Arguments>
+int pass(const char *name, Function *, Arguments... arguments)
+{
+    const Passing passing(name);
+    if (const int code = injected(passing, name); code != 0)
+        return code;
+    return findReal<Function>(name)(arguments...);
+}
+
+/// As pass(), of a call that gives out a handle.
+template <class Handle, class Function, class... Arguments>
+int passAcquiring(const char *name, Function *, Handle **out, Arguments... arguments)
+{
+    const Passing passing(name);
+    if (const int code = injected(passing, name); code != 0)
+        return code;
+    const int code = findReal<Function>(name)(out, arguments...);
+    if (passing.isNoted() && code == 0 && out != nullptr)
+        current->handles.insert(*out);
+    return code;
+}
+
+/// Of a call that takes a handle back.
+template <class Handle> void passReleasing(const char *name, Handle *handle)
+{
+    const Passing passing(name);
+    if (passing.isNoted())
+        current->handles.erase(handle);
+    findReal<void(Handle *)>(name)(handle);
+}
+
+template <class Hook, class... Arguments> void tell(Hook hook, Arguments... arguments)
+{
+    if (current != nullptr && depth == 0 && current->*hook)
+        (current->*hook)(arguments...);
 }
 
 } // namespace
@@ -41,42 +112,44 @@ LibGit2Calls::~LibGit2Calls()
 
 } // namespace vclink::test
 
+using vclink::test::LibGit2Calls;
+
 int git_libgit2_init()
 {
-    note("git_libgit2_init");
-    if (current != nullptr && current->onInit)
+    const Passing passing("git_libgit2_init");
+    if (passing.isNoted() && current->onInit)
         return current->onInit();
     return findReal<decltype(git_libgit2_init)>("git_libgit2_init")();
 }
 
 int git_libgit2_shutdown()
 {
-    note("git_libgit2_shutdown");
-    if (current != nullptr && current->onShutdown)
+    const Passing passing("git_libgit2_shutdown");
+    if (passing.isNoted() && current->onShutdown)
         return current->onShutdown();
     return findReal<decltype(git_libgit2_shutdown)>("git_libgit2_shutdown")();
 }
 
 int git_libgit2_version(int *major, int *minor, int *revision)
 {
-    note("git_libgit2_version");
-    if (current != nullptr && current->onVersion)
+    const Passing passing("git_libgit2_version");
+    if (passing.isNoted() && current->onVersion)
         return current->onVersion(major, minor, revision);
     return findReal<decltype(git_libgit2_version)>("git_libgit2_version")(major, minor, revision);
 }
 
 int git_libgit2_features()
 {
-    note("git_libgit2_features");
-    if (current != nullptr && current->onFeatures)
+    const Passing passing("git_libgit2_features");
+    if (passing.isNoted() && current->onFeatures)
         return current->onFeatures();
     return findReal<decltype(git_libgit2_features)>("git_libgit2_features")();
 }
 
 int git_status_options_init(git_status_options *options, unsigned version)
 {
-    note("git_status_options_init");
-    if (current != nullptr && current->onStatusOptionsInit)
+    const Passing passing("git_status_options_init");
+    if (passing.isNoted() && current->onStatusOptionsInit)
         return current->onStatusOptionsInit();
     return findReal<decltype(git_status_options_init)>("git_status_options_init")(options, version);
 }
@@ -84,25 +157,183 @@ int git_status_options_init(git_status_options *options, unsigned version)
 int git_repository_open_ext(git_repository **out, const char *path, unsigned flags,
                             const char *ceilings)
 {
-    note(out == nullptr ? "git_repository_open_ext(nullptr)" : "git_repository_open_ext");
-    if (current != nullptr && current->onOpen)
-        current->onOpen(path, flags, ceilings);
-    return findReal<decltype(git_repository_open_ext)>("git_repository_open_ext")(out, path, flags,
-                                                                                  ceilings);
+    tell(&LibGit2Calls::onOpen, path, flags, ceilings);
+    if (out == nullptr)
+    {
+        const Passing passing("git_repository_open_ext(nullptr)");
+        return findReal<decltype(git_repository_open_ext)>("git_repository_open_ext")(
+            out, path, flags, ceilings);
+    }
+    return passAcquiring("git_repository_open_ext", git_repository_open_ext, out, path, flags,
+                         ceilings);
 }
 
 int git_status_foreach_ext(git_repository *repository, const git_status_options *options,
                            git_status_cb callback, void *payload)
 {
-    note("git_status_foreach_ext");
+    const Passing passing("git_status_foreach_ext");
     auto *const real = findReal<decltype(git_status_foreach_ext)>("git_status_foreach_ext");
-    if (current != nullptr && current->onStatusForeach)
+    if (passing.isNoted() && current->onStatusForeach)
         return current->onStatusForeach(real, repository, options, callback, payload);
     return real(repository, options, callback, payload);
 }
 
 void git_repository_free(git_repository *repository)
 {
-    note("git_repository_free");
-    findReal<decltype(git_repository_free)>("git_repository_free")(repository);
+    passReleasing("git_repository_free", repository);
+}
+
+int git_repository_index(git_index **out, git_repository *repository)
+{
+    return passAcquiring("git_repository_index", git_repository_index, out, repository);
+}
+
+int git_index_add_all(git_index *index, const git_strarray *pathspec, unsigned flags,
+                      git_index_matched_path_cb callback, void *payload)
+{
+    tell(&LibGit2Calls::onAddAll, pathspec, flags, callback, payload);
+    return pass("git_index_add_all", git_index_add_all, index, pathspec, flags, callback, payload);
+}
+
+int git_index_remove_all(git_index *index, const git_strarray *pathspec,
+                         git_index_matched_path_cb callback, void *payload)
+{
+    tell(&LibGit2Calls::onRemoveAll, pathspec, callback, payload);
+    return pass("git_index_remove_all", git_index_remove_all, index, pathspec, callback, payload);
+}
+
+int git_index_write(git_index *index)
+{
+    return pass("git_index_write", git_index_write, index);
+}
+
+void git_index_free(git_index *index)
+{
+    passReleasing("git_index_free", index);
+}
+
+int git_revparse_single(git_object **out, git_repository *repository, const char *text)
+{
+    tell(&LibGit2Calls::onRevparse, text);
+    return passAcquiring("git_revparse_single", git_revparse_single, out, repository, text);
+}
+
+int git_reset_default(git_repository *repository, const git_object *target,
+                      const git_strarray *pathspec)
+{
+    tell(&LibGit2Calls::onReset, target, pathspec);
+    return pass("git_reset_default", git_reset_default, repository, target, pathspec);
+}
+
+int git_checkout_options_init(git_checkout_options *options, unsigned version)
+{
+    return pass("git_checkout_options_init", git_checkout_options_init, options, version);
+}
+
+int git_checkout_index(git_repository *repository, git_index *index,
+                       const git_checkout_options *options)
+{
+    tell(&LibGit2Calls::onCheckout, index, options);
+    return pass("git_checkout_index", git_checkout_index, repository, index, options);
+}
+
+void git_object_free(git_object *object)
+{
+    passReleasing("git_object_free", object);
+}
+
+int git_reference_dwim(git_reference **out, git_repository *repository, const char *name)
+{
+    tell(&LibGit2Calls::onDwim, name);
+    return passAcquiring("git_reference_dwim", git_reference_dwim, out, repository, name);
+}
+
+void git_reference_free(git_reference *reference)
+{
+    passReleasing("git_reference_free", reference);
+}
+
+int git_commit_lookup(git_commit **out, git_repository *repository, const git_oid *id)
+{
+    return passAcquiring("git_commit_lookup", git_commit_lookup, out, repository, id);
+}
+
+void git_commit_free(git_commit *commit)
+{
+    passReleasing("git_commit_free", commit);
+}
+
+int git_repository_state(git_repository *repository)
+{
+    return pass("git_repository_state", git_repository_state, repository);
+}
+
+int git_repository_mergehead_foreach(git_repository *repository,
+                                     git_repository_mergehead_foreach_cb callback, void *payload)
+{
+    return pass("git_repository_mergehead_foreach", git_repository_mergehead_foreach, repository,
+                callback, payload);
+}
+
+int git_signature_default(git_signature **out, git_repository *repository)
+{
+    return passAcquiring("git_signature_default", git_signature_default, out, repository);
+}
+
+int git_signature_now(git_signature **out, const char *name, const char *email)
+{
+    return passAcquiring("git_signature_now", git_signature_now, out, name, email);
+}
+
+void git_signature_free(git_signature *signature)
+{
+    passReleasing("git_signature_free", signature);
+}
+
+int git_index_update_all(git_index *index, const git_strarray *pathspec,
+                         git_index_matched_path_cb callback, void *payload)
+{
+    tell(&LibGit2Calls::onUpdateAll, pathspec, callback, payload);
+    return pass("git_index_update_all", git_index_update_all, index, pathspec, callback, payload);
+}
+
+int git_index_open(git_index **out, const char *path)
+{
+    return passAcquiring("git_index_open", git_index_open, out, path);
+}
+
+int git_index_add(git_index *index, const git_index_entry *entry)
+{
+    return pass("git_index_add", git_index_add, index, entry);
+}
+
+int git_index_write_tree(git_oid *out, git_index *index)
+{
+    return pass("git_index_write_tree", git_index_write_tree, out, index);
+}
+
+int git_tree_lookup(git_tree **out, git_repository *repository, const git_oid *id)
+{
+    return passAcquiring("git_tree_lookup", git_tree_lookup, out, repository, id);
+}
+
+void git_tree_free(git_tree *tree)
+{
+    passReleasing("git_tree_free", tree);
+}
+
+int git_commit_create(git_oid *id, git_repository *repository, const char *reference,
+                      const git_signature *author, const git_signature *committer,
+                      const char *encoding, const char *message, const git_tree *tree,
+                      std::size_t parentCount, const git_commit *parents[])
+{
+    tell(&LibGit2Calls::onCommitCreate, reference, author, committer, encoding, message,
+         parentCount);
+    return pass("git_commit_create", git_commit_create, id, repository, reference, author,
+                committer, encoding, message, tree, parentCount, parents);
+}
+
+int git_repository_state_cleanup(git_repository *repository)
+{
+    return pass("git_repository_state_cleanup", git_repository_state_cleanup, repository);
 }

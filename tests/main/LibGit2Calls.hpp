@@ -1,7 +1,10 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include <cstddef>
 #include <functional>
+#include <map>
+#include <set>
 #include <string>
 #include <vector>
 
@@ -11,8 +14,8 @@ namespace vclink::test
 {
 
 /// Stands between the library and libgit2 in a program that links this file: notes the library's
-/// calls in order, and lets a test answer in libgit2's place. Calls that libgit2 makes of itself
-/// may be noted too. For one thread.
+/// calls in order, and lets a test answer in libgit2's place. What libgit2 calls of itself, during
+/// one of these calls, is neither noted nor answered. For one thread.
 class LibGit2Calls
 {
   public:
@@ -24,6 +27,12 @@ class LibGit2Calls
 
     /// The names of the calls, in order.
     std::vector<std::string> names;
+    /// The handles that the calls gave out and did not take back yet.
+    std::set<const void *> handles;
+
+    /// The codes to answer in libgit2's place, by the name of the call, with an error record of the
+    /// class GIT_ERROR_OS and the text "injected".
+    std::map<std::string, int> failing;
 
     /// What answers in libgit2's place where it is set. The replacement of the walk is given the
     /// real one as well.
@@ -36,8 +45,27 @@ class LibGit2Calls
     std::function<int()> onShutdown;
     std::function<int(int *, int *, int *)> onVersion;
     std::function<int()> onFeatures;
-    /// Told of each opening's arguments.
+
+    /// Told of the arguments before the call goes on, where it is set.
     std::function<void(const char *path, unsigned flags, const char *ceilings)> onOpen;
+    std::function<void(const git_strarray *pathspec, unsigned flags,
+                       git_index_matched_path_cb callback, void *payload)>
+        onAddAll;
+    std::function<void(const git_strarray *pathspec, git_index_matched_path_cb callback,
+                       void *payload)>
+        onRemoveAll;
+    std::function<void(const char *text)> onRevparse;
+    std::function<void(const git_object *target, const git_strarray *pathspec)> onReset;
+    std::function<void(git_index *index, const git_checkout_options *options)> onCheckout;
+    std::function<void(const char *name)> onDwim;
+    std::function<void(const git_strarray *pathspec, git_index_matched_path_cb callback,
+                       void *payload)>
+        onUpdateAll;
+    /// What git_commit_create is given but for the repository, with the number of parents.
+    std::function<void(const char *reference, const git_signature *author,
+                       const git_signature *committer, const char *encoding, const char *message,
+                       std::size_t parents)>
+        onCommitCreate;
 };
 
 } // namespace vclink::test

@@ -8,6 +8,7 @@
 #include <gtest/gtest.h>
 
 #include "AdapterTest.hpp"
+#include "RepositoryState.hpp"
 #include "error/notAvailable.hpp"
 #include "options/gitRecords.hpp"
 #include "support/text.hpp"
@@ -28,7 +29,10 @@ class SlotsNotAvailable : public vclink::test::AdapterTest
 
     SlotsNotAvailable()
     {
+        // So that each operation has something to do, and a commit an identity.
         repository_.write("file", "x");
+        repository_.git({"config", "user.name", "Somebody"});
+        repository_.git({"config", "user.email", "somebody@example.com"});
     }
 
     Slots adapterSlots()
@@ -155,11 +159,13 @@ TEST_F(SlotsNotAvailable, RaiseAnErrorWithAReadableText)
 
 TEST_F(SlotsNotAvailable, ChangeNothingInTheRepository)
 {
-    const std::string before = repository_.git({"status", "--porcelain", "-uall"});
-    for (const auto &[name, slot] : adapterSlots())
-        raisedText(slot);
-    EXPECT_EQ(repository_.git({"status", "--porcelain", "-uall"}), before);
-    EXPECT_FALSE(repository_.tryGit({"rev-parse", "--verify", "HEAD"}).succeeded());
+    const auto before = stateOf(repository_);
+    auto slots = allSlots();
+    for (const auto &name : listed())
+    {
+        EXPECT_NE(raisedText(slots.at(name)), "") << name;
+        EXPECT_EQ(stateOf(repository_), before) << name;
+    }
 }
 
 } // namespace

@@ -8,8 +8,8 @@
 namespace vclink::test
 {
 
-/// A host's own factory, which tells when it is asked for the options of a status walk and when it
-/// goes.
+/// A host's own factory, which tells when it is asked for the options of a status walk or of a
+/// checkout and when it goes.
 class TestOptionsFactory : public git::GitOptionsFactory
 {
   public:
@@ -37,7 +37,9 @@ class TestOptionsFactory : public git::GitOptionsFactory
     }
     git::CheckoutOptions makeCheckoutOptions() override
     {
-        return {};
+        if (onCheckoutOptions)
+            onCheckoutOptions();
+        return checkoutOptions;
     }
     git::StatusOptions makeStatusOptions() override
     {
@@ -51,6 +53,8 @@ class TestOptionsFactory : public git::GitOptionsFactory
     }
 
     std::function<void()> onStatusOptions;
+    std::function<void()> onCheckoutOptions;
+    git::CheckoutOptions checkoutOptions;
     std::function<void()> onDestruction;
 };
 

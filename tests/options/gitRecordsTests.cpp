@@ -134,8 +134,6 @@ void expectNotAvailable(const std::function<void(GitCallbacks &)> &convert)
 TEST(GitRecords, ThatThisBuildDoesNotMakeSaySo)
 {
     expectNotAvailable([](GitCallbacks &callbacks)
-                       { toGitCheckoutOptions(CheckoutOptions(), callbacks.checkoutCallbacks()); });
-    expectNotAvailable([](GitCallbacks &callbacks)
                        { toGitRemoteCallbacks(callbacks.remoteCallbacks()); });
     expectNotAvailable([](GitCallbacks &callbacks)
                        { toGitFetchOptions(FetchOptions(), callbacks); });

@@ -40,8 +40,12 @@ class Backend : public logging::sinks::basic_sink_backend<logging::sinks::concur
             return;
         LogRecord record{logging::extract_or_default<unsigned>("Severity", view, 0u),
                          std::move(channel), textOf("Message", view)};
-        const std::lock_guard<std::mutex> lock(mutex_);
-        records_.push_back(std::move(record));
+        {
+            const std::lock_guard<std::mutex> lock(mutex_);
+            records_.push_back(record);
+        }
+        if (onRecord)
+            onRecord(record);
     }
 
     std::vector<LogRecord> records() const
@@ -55,6 +59,8 @@ class Backend : public logging::sinks::basic_sink_backend<logging::sinks::concur
         const std::lock_guard<std::mutex> lock(mutex_);
         records_.clear();
     }
+
+    std::function<void(const LogRecord &)> onRecord;
 
   private:
     const std::string channel_;
@@ -112,6 +118,11 @@ std::vector<std::string> LogCapture::messages(unsigned severity) const
 void LogCapture::clear()
 {
     impl_->backend->clear();
+}
+
+void LogCapture::onRecord(std::function<void(const LogRecord &)> told)
+{
+    impl_->backend->onRecord = std::move(told);
 }
 
 } // namespace vclink::test

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include <functional>
 #include <memory>
 #include <string>
 #include <vector>
@@ -35,6 +36,9 @@ class LogCapture
     /// The texts of what came so far; with `severity`, of the records that have it only.
     std::vector<std::string> messages(unsigned severity = allSeverities) const;
     void clear();
+    /// Called for each record from now on, after it was collected, on the thread that wrote it. Set
+    /// it before other threads write.
+    void onRecord(std::function<void(const LogRecord &record)> told);
 
   private:
     struct Impl;

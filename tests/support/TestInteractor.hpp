@@ -1,6 +1,9 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include <cstddef>
+#include <functional>
+#include <variant>
 #include <vector>
 
 #include "fl/ustring.hpp"
@@ -11,6 +14,9 @@
 namespace vclink::test
 {
 
+/// What a progress display is told: how much is done, or a message.
+using ProgressCall = std::variant<double, ustring>;
+
 /// Remembers all progress, in order.
 class RecordingProgressReporter : public ProgressReporter
 {
@@ -20,6 +26,14 @@ class RecordingProgressReporter : public ProgressReporter
 
     std::vector<double> fractions;
     std::vector<ustring> messages;
+    /// The calls of both kinds.
+    std::vector<ProgressCall> calls;
+    /// Where it is set, called at the end of each call with the call's number, 1 for the first.
+    /// What it raises goes to the caller.
+    std::function<void(std::size_t number)> onCall;
+
+  private:
+    void remember(ProgressCall call);
 };
 
 /// An application that can be cancelled and remembers its progress.

@@ -30,17 +30,52 @@ class VCLINK_GIT_EXPORT GitAdapterFactory : public vclink::CMAdapterFactory
     /// every operation to its end on the calling thread. It caches nothing: each operation opens
     /// the repository and sees it as it then is.
     ///
+    /// Every operation opens the repository anew, and throws LibGit2Exception with libgit2's text
+    /// when it can't, or when a call to libgit2 fails. Lists of files are read alike: a file that
+    /// lies outside the working copy, or that Git does not know, matches nothing; the characters
+    /// '*', '?' and '[' in a name act as patterns; a symbolic link means its target, one that leads
+    /// nowhere itself; a folder means all below it. boost::filesystem::filesystem_error comes of a
+    /// path that can't be resolved.
+    ///
     /// What the adapter carries out:
     /// - getFileStates: the states of the files named, one walk for the whole list. A file that Git
-    ///   ignores, or that is not there, is not in the result. The characters '*', '?' and '[' in a
-    ///   name act as patterns; a symbolic link means its target. An empty list gives an empty map
-    ///   and opens nothing.
+    ///   ignores, or that is not there, is not in the result. An empty list gives an empty map and
+    ///   opens nothing. git_status_foreach_ext.
     /// - getFolderStates: the states of all files below a folder, ignored ones left out.
+    ///   git_status_foreach_ext. In both state queries a walk that fails on its way raises nothing
+    ///   and gives the states found so far, none for a bare repository.
+    /// - addFiles: begins to track unversioned files. Raises the exception of
+    ///   shared_vclink::git::AlreadyAdded, which names them, when Git knows some of the files in
+    ///   whatever state; nothing is added then. git_index_add_all.
+    /// - removeFiles: ends the tracking of files, which stay on the disk. Raises the exception of
+    ///   shared_vclink::git::NoFilesToRemove when there is none that is not removed already.
+    ///   git_index_remove_all.
+    /// - markResolved: puts the file as it now stands, or its absence, in the place of what the
+    ///   index has for it, a conflict included; a link that leads nowhere counts as absent.
+    ///   git_index_add_all, git_index_remove_all.
+    /// - commit: makes a commit on HEAD of every tracked file as it stands on the disk, staged or
+    ///   not, also when nothing has changed, and concludes a merge or whatever else is under way.
+    ///   The first argument is not read, the message is taken as it stands, up to a first NUL. The
+    ///   author is who `user.name` and `user.email` name, otherwise "USER" or "LOGNAME" at the
+    ///   host's name; raises the exception of shared_vclink::git::NoUserName when there is neither,
+    ///   and boost::system::system_error when the host has no name to be found. Files in conflict
+    ///   are taken as they stand, markers included. A file that a sparse checkout leaves out stays
+    ///   as the index has it; one that can't be read makes the commit fail. After a failure HEAD,
+    ///   and the state of a merge, are as before, and the index may hold the changes already; only
+    ///   when the state can't be cleaned up does the commit stand.
+    ///   git_index_update_all, git_commit_create, git_repository_state_cleanup.
+    /// - revertFiles: throws away all changes to the files, staged or not, and brings back missing
+    ///   ones; a file that HEAD does not have leaves the index and stays on the disk. What stands
+    ///   in the way of a file goes, a symbolic link included. Raises the exception of
+    ///   shared_vclink::git::Conflicted, which names them, when some are in conflict; nothing is
+    ///   changed then. Reports progress, and ends with
+    ///   vclink::util::exception::CancelledOperationException when the application asks for it
+    ///   before the first file is written; the index is back at HEAD then, the files are untouched.
+    ///   After any other failure of the checkout the files may be restored in part.
+    ///   git_reset_default, git_checkout_index.
     /// - getRootFolder: `root`.
-    /// Both state queries throw LibGit2Exception when the repository can't be opened, and
-    /// boost::filesystem::filesystem_error when a path can't be resolved. A walk that fails on its
-    /// way raises nothing and gives the states found so far, none for a bare repository.
-    /// git_status_foreach_ext.
+    /// The index on disk is written whole or not at all. While another process holds its lock, the
+    /// operations that change it fail and change nothing.
     ///
     /// @param interactor not null; shared for the adapter's life
     /// @throws std::bad_alloc

@@ -2,6 +2,7 @@
 #pragma once
 
 #include <string>
+#include <vector>
 
 #include "fl/ustring.hpp"
 #include "resource_core/BaseMsgID.hpp"
@@ -18,6 +19,10 @@ namespace detail
 
 VCLINK_GIT_EXPORT extern const char *const catalogue;
 
+inline resource_core::MsgArgument makeArgument(long number)
+{
+    return number;
+}
 inline resource_core::MsgArgument makeArgument(const char *text)
 {
     return std::string(text);
@@ -31,6 +36,17 @@ inline resource_core::MsgArgument makeArgument(const ustring &text)
     return text;
 }
 
+/// Without the copy that a list of initialisers makes: such a message goes with every file of a
+/// checkout.
+template <class... Values>
+std::vector<resource_core::MsgArgument> makeArguments(const Values &...values)
+{
+    std::vector<resource_core::MsgArgument> arguments;
+    arguments.reserve(sizeof...(values));
+    (arguments.push_back(makeArgument(values)), ...);
+    return arguments;
+}
+
 } // namespace detail
 
 /// A call of libgit2 failed; raised as vclink::git::LibGit2Exception.
@@ -42,7 +58,7 @@ class VCLINK_GIT_EXPORT LibGit2Error : public resource_core::BaseMsgID
     /// @param text libgit2's text
     template <class Text>
     LibGit2Error(long code, long errorClass, const Text &text)
-        : BaseMsgID({code, errorClass, detail::makeArgument(text)}, detail::catalogue,
+        : BaseMsgID(detail::makeArguments(code, errorClass, text), detail::catalogue,
                     "LibGit2Error")
     {
     }
@@ -57,7 +73,7 @@ class VCLINK_GIT_EXPORT MergeFailed : public resource_core::BaseMsgID
     /// @param branchName what was to be merged, UTF-8
     template <class Text>
     explicit MergeFailed(const Text &branchName)
-        : BaseMsgID({detail::makeArgument(branchName)}, detail::catalogue, "MergeFailed")
+        : BaseMsgID(detail::makeArguments(branchName), detail::catalogue, "MergeFailed")
     {
     }
     MergeFailed(const MergeFailed &) = default;
@@ -98,7 +114,7 @@ class VCLINK_GIT_EXPORT AlreadyAdded : public resource_core::BaseMsgID
     /// @param files the report of the files
     template <class Text>
     explicit AlreadyAdded(const Text &files)
-        : BaseMsgID({detail::makeArgument(files)}, detail::catalogue, "AlreadyAdded")
+        : BaseMsgID(detail::makeArguments(files), detail::catalogue, "AlreadyAdded")
     {
     }
     AlreadyAdded(const AlreadyAdded &) = default;
@@ -121,7 +137,7 @@ class VCLINK_GIT_EXPORT Conflicted : public resource_core::BaseMsgID
     /// @param files the report of the files
     template <class Text>
     explicit Conflicted(const Text &files)
-        : BaseMsgID({detail::makeArgument(files)}, detail::catalogue, "Conflicted")
+        : BaseMsgID(detail::makeArguments(files), detail::catalogue, "Conflicted")
     {
     }
     Conflicted(const Conflicted &) = default;
@@ -145,7 +161,7 @@ class VCLINK_GIT_EXPORT InvalidGitAttributeValue : public resource_core::BaseMsg
     /// @param value the raw value, UTF-8
     template <class Text>
     explicit InvalidGitAttributeValue(const Text &value)
-        : BaseMsgID({detail::makeArgument(value)}, detail::catalogue, "InvalidGitAttributeValue")
+        : BaseMsgID(detail::makeArguments(value), detail::catalogue, "InvalidGitAttributeValue")
     {
     }
     InvalidGitAttributeValue(const InvalidGitAttributeValue &) = default;
@@ -159,7 +175,7 @@ class VCLINK_GIT_EXPORT ProgressCallbackCheckoutMessage : public resource_core::
     /// @param path the file, relative to the root
     template <class Text>
     explicit ProgressCallbackCheckoutMessage(const Text &path)
-        : BaseMsgID({detail::makeArgument(path)}, detail::catalogue,
+        : BaseMsgID(detail::makeArguments(path), detail::catalogue,
                     "ProgressCallbackCheckoutMessage")
     {
     }

@@ -1,5 +1,7 @@
 // SPDX-License-Identifier: MIT
+#include <cstddef>
 #include <string>
+#include <vector>
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
@@ -16,6 +18,7 @@ namespace
 
 using testing::ElementsAre;
 using vclink::test::LogCapture;
+using vclink::test::ProgressCall;
 
 using Logger = foundation::core::log::basic_diagnostic_logger<char>;
 
@@ -93,6 +96,37 @@ TEST(TestInteractor, RemembersProgress)
     interactor.getProgressReporter()->setProgressMessage(u"half");
     EXPECT_THAT(interactor.progress.fractions, ElementsAre(0.5));
     EXPECT_THAT(interactor.progress.messages, ElementsAre(ustring(u"half")));
+    EXPECT_THAT(interactor.progress.calls,
+                ElementsAre(ProgressCall(0.5), ProgressCall(ustring(u"half"))));
+}
+
+TEST(TestInteractor, TellsTheNumberOfEachCallAndPassesOnWhatIsRaised)
+{
+    vclink::test::TestInteractor interactor;
+    std::vector<std::size_t> numbers;
+    interactor.progress.onCall = [&numbers](std::size_t number)
+    {
+        numbers.push_back(number);
+        if (number == 2)
+            throw number;
+    };
+    interactor.progress.setProgress(0.0);
+    EXPECT_THROW(interactor.progress.setProgressMessage(u"half"), std::size_t);
+    interactor.progress.setProgress(1.0);
+    EXPECT_THAT(numbers, ElementsAre(1u, 2u, 3u));
+    EXPECT_EQ(interactor.progress.calls.size(), 3u);
+}
+
+TEST(LogCapture, TellsOfEachRecordWhenItComes)
+{
+    Logger logger("vclink::test::told");
+    LogCapture capture(0x02, "vclink::test::told");
+    std::vector<std::string> told;
+    capture.onRecord([&told](const vclink::test::LogRecord &record)
+                     { told.push_back(record.message); });
+    write(logger, 0x02, "one");
+    EXPECT_THAT(told, ElementsAre("one"));
+    EXPECT_THAT(capture.messages(), ElementsAre("one"));
 }
 
 } // namespace

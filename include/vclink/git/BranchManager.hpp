@@ -1,0 +1,93 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "vclink/CMAdapter.hpp"
+#include "vclink/git/BranchParameters.hpp"
+#include "vclink/git/BranchPointer.hpp"
+#include "vclink/git/export.hpp"
+
+struct git_oid;
+
+namespace vclink::git
+{
+
+/// The branches of one working copy. Each operation opens the repository of the adapter, runs to
+/// its end on the calling thread, and keeps nothing. Names and revisions are UTF-8. For one thread
+/// at a time, as its adapter.
+///
+/// Unless an operation says otherwise it throws LibGit2Exception, with libgit2's text, when a call
+/// to libgit2 fails, and nothing has changed then. The order of the operations is binding.
+class VCLINK_GIT_EXPORT BranchManager
+{
+  public:
+    using BranchName = std::string;
+
+    /// @param adapter one that GitAdapterFactory has made; must outlive the manager
+    /// @throws std::bad_cast for any other adapter
+    static std::unique_ptr<BranchManager> create(vclink::CMAdapter &adapter);
+
+    BranchManager() = default;
+    BranchManager(const BranchManager &) = delete;
+    BranchManager &operator=(const BranchManager &) = delete;
+    virtual ~BranchManager();
+
+    /// Full names, beginning with "refs/heads/", in libgit2's order. git_branch_next.
+    virtual std::vector<BranchPointer> getLocalBranches() const = 0;
+    /// Full names, beginning with "refs/remotes/", in libgit2's order. git_branch_next.
+    virtual std::vector<BranchPointer> getRemoteBranches() const = 0;
+
+    /// The id of HEAD, 40 hexadecimal digits; getRevision("HEAD").
+    virtual std::string getHeadRevision() const = 0;
+    /// The id of the object that a revision text names, 40 hexadecimal digits.
+    /// git_revparse_single.
+    virtual std::string getRevision(const std::string &revision) const = 0;
+    /// The same id, its 20 bytes.
+    virtual git_oid getRevisionId(const std::string &revision) const = 0;
+
+    /// Checks a local branch out and moves HEAD to it. Changes of the user that the branch does not
+    /// touch stay; ones that it touches make the switch fail. An ignored file that the branch
+    /// tracks is overwritten. Where a tag has the same name, its tree is checked out. Reports
+    /// progress. After a failure or a cancellation HEAD is where it was; the files are too, unless
+    /// one of them, or HEAD itself, couldn't be written. git_branch_lookup, git_revparse_single,
+    /// git_checkout_tree, git_repository_set_head.
+    /// @param name the short name
+    /// @throws vclink::util::exception::CancelledOperationException
+    virtual void switchBranch(const BranchName &name) = 0;
+
+    /// Makes a local branch; HEAD stays. An existing branch of the name is a failure.
+    /// git_branch_create.
+    virtual void createBranch(const BranchParameters &parameters) = 0;
+
+    /// Deletes a local branch, merged or not; the one that HEAD points at is a failure.
+    /// git_branch_delete.
+    virtual void deleteBranch(const BranchName &name) = 0;
+
+    /// The short name of the branch that HEAD points at. A repository without a commit and one with
+    /// a detached HEAD have none, which is a failure. git_repository_head, git_branch_name.
+    virtual BranchPointer getCurrentBranch() const = 0;
+
+    /// Merges a branch, or the commit that any revision text names (an annotated tag as
+    /// "tag^{commit}"), into the current branch: does nothing when it is merged already,
+    /// fast-forwards where that is possible and `merge.ff` allows it, and otherwise makes a merge
+    /// commit, running the merge drivers that the repository's configuration and attributes name.
+    /// Reports progress. A merge that is no fast-forward puts back tracked files that are modified
+    /// or missing and that it does not touch itself.
+    ///
+    /// After conflicts the repository is in the state of a merge, with markers in the files in
+    /// conflict, save those that are not text, which are ours: CMAdapter::markResolved and
+    /// CMAdapter::commit go on. git_merge_analysis, git_checkout_tree, git_merge.
+    /// @throws GitException with the message shared_vclink::git::MergeFailed, whose added text
+    /// tells the cause, a cancellation and conflicts included
+    virtual void merge(BranchName name) = 0;
+
+    /// The repository's state in words: "Normal", "Conflicts" while a merge, revert or cherry-pick
+    /// is under way, "Bisecting", "Rebase", "Rebase interactive", "Rebase w/merge", "Apply
+    /// mailbox", "Rebase/Apply mailbox". git_repository_state.
+    virtual std::string getRepositoryState() const = 0;
+};
+
+} // namespace vclink::git

@@ -1,0 +1,169 @@
+// SPDX-License-Identifier: MIT
+#include "main/BasicBranchManager.hpp"
+
+#include <array>
+
+#include <git2/branch.h>
+#include <git2/checkout.h>
+#include <git2/errors.h>
+#include <git2/refs.h>
+#include <git2/repository.h>
+
+#include "error/errorUtil/GitResult.hpp"
+#include "error/logging/ScopeTrace.hpp"
+#include "error/logging/logger.hpp"
+#include "main/BranchMerger.hpp"
+#include "options/gitRecords.hpp"
+#include "util/repository.hpp"
+
+namespace vclink::git
+{
+namespace
+{
+
+std::vector<BranchPointer> listBranches(git_branch_t type, git_repository *repository)
+{
+    const OwnedHandle<git_branch_iterator> iterator =
+        acquire<git_branch_iterator>(git_branch_iterator_new, repository, type).value();
+    std::vector<BranchPointer> branches;
+    for (;;)
+    {
+        git_branch_t found{};
+        auto reference = acquire<git_reference>(git_branch_next, &found, iterator.get());
+        if (reference.has_error() && reference.error().getCode() == GIT_ITEROVER)
+        {
+            return branches;
+        }
+        const OwnedHandle<git_reference> branch = std::move(reference).value();
+        if ((static_cast<unsigned>(found) & static_cast<unsigned>(type)) != 0)
+        {
+            branches.emplace_back(git_reference_name(branch.get()));
+        }
+    }
+}
+
+OwnedHandle<git_reference> lookupLocalBranch(git_repository *repository, const std::string &name)
+{
+    return acquire<git_reference>(git_branch_lookup, repository, name.c_str(), GIT_BRANCH_LOCAL)
+        .value();
+}
+
+} // namespace
+
+BasicBranchManager::BasicBranchManager(GitAdapter &adapter)
+    : adapter_(adapter), optionsFactory_(adapter.getOptionsFactory()),
+      callbacks_(&adapter.getCallbacks())
+{
+}
+
+BasicBranchManager::~BasicBranchManager() = default;
+
+std::vector<BranchPointer> BasicBranchManager::getLocalBranches() const
+{
+    return listBranches(GIT_BRANCH_LOCAL, adapter_.getRepository().get());
+}
+
+std::vector<BranchPointer> BasicBranchManager::getRemoteBranches() const
+{
+    return listBranches(GIT_BRANCH_REMOTE, adapter_.getRepository().get());
+}
+
+std::string BasicBranchManager::getHeadRevision() const
+{
+    return getRevision("HEAD");
+}
+
+std::string BasicBranchManager::getRevision(const std::string &revision) const
+{
+    const OwnedHandle<git_repository> repository = adapter_.getRepository();
+    std::array<char, GIT_OID_HEXSZ> digits{};
+    git_oid_fmt(digits.data(), revparseId(revision, repository.get()));
+    return std::string(digits.data(), digits.size());
+}
+
+git_oid BasicBranchManager::getRevisionId(const std::string &revision) const
+{
+    const OwnedHandle<git_repository> repository = adapter_.getRepository();
+    return *revparseId(revision, repository.get());
+}
+
+void BasicBranchManager::switchBranch(const BranchName &name)
+{
+    const ScopeTrace trace(
+        logger(), "virtual void vclink::git::BasicBranchManager::switchBranch(const BranchName&)",
+        "main/BasicBranchManager", 107);
+    writeRecord(SeverityParameter, " branch=", name);
+    const OwnedHandle<git_repository> repository = adapter_.getRepository();
+    const OwnedHandle<git_reference> branch = lookupLocalBranch(repository.get(), name);
+    const OwnedHandle<git_object> target = revparseObject(repository.get(), name).value();
+    const CheckoutOptions options = optionsFactory_->makeCheckoutOptions();
+    const git_checkout_options record =
+        toGitCheckoutOptions(options, callbacks_->checkoutCallbacks());
+    makeResult(git_checkout_tree(repository.get(), target.get(), &record)).value();
+    // Only now, so that a checkout that fails leaves HEAD where it was.
+    makeResult(git_repository_set_head(repository.get(), git_reference_name(branch.get()))).value();
+}
+
+void BasicBranchManager::createBranch(const BranchParameters &parameters)
+{
+    const OwnedHandle<git_repository> repository = adapter_.getRepository();
+    const OwnedHandle<git_commit> commit =
+        lookupCommitByName(parameters.getStartPoint().c_str(), repository.get()).value();
+    acquire<git_reference>(git_branch_create, repository.get(), parameters.getName().c_str(),
+                           commit.get(), 0)
+        .value();
+}
+
+void BasicBranchManager::deleteBranch(const BranchName &name)
+{
+    const OwnedHandle<git_repository> repository = adapter_.getRepository();
+    const OwnedHandle<git_reference> branch = lookupLocalBranch(repository.get(), name);
+    makeResult(git_branch_delete(branch.get())).value();
+}
+
+BranchPointer BasicBranchManager::getCurrentBranch() const
+{
+    const OwnedHandle<git_repository> repository = adapter_.getRepository();
+    const OwnedHandle<git_reference> head =
+        acquire<git_reference>(git_repository_head, repository.get()).value();
+    const char *name = nullptr;
+    makeResult(git_branch_name(&name, head.get())).value();
+    return BranchPointer(name);
+}
+
+void BasicBranchManager::merge(BranchName name)
+{
+    const ScopeTrace trace(
+        logger(),
+        "virtual void vclink::git::BasicBranchManager::merge(vclink::git::BranchManager::"
+        "BranchName)",
+        "main/BasicBranchManager", 151);
+    writeRecord(SeverityParameter, " branchName=", name);
+    BranchMerger(adapter_, optionsFactory_, *callbacks_).performMerge(name);
+}
+
+std::string BasicBranchManager::getRepositoryState() const
+{
+    const OwnedHandle<git_repository> repository = adapter_.getRepository();
+    return describeRepositoryState(git_repository_state(repository.get()));
+}
+
+std::string describeRepositoryState(int state)
+{
+    // By the numbers of git_repository_state_t.
+    static constexpr std::array<const char *, 12> texts{
+        "Normal",        "Conflicts",           "Conflicts", "Conflicts",          "Conflicts",
+        "Conflicts",     "Bisecting",           "Rebase",    "Rebase interactive", "Rebase w/merge",
+        "Apply mailbox", "Rebase/Apply mailbox"};
+    const bool isKnown = state >= 0 && static_cast<std::size_t>(state) < texts.size();
+    return isKnown ? texts[static_cast<std::size_t>(state)] : std::string();
+}
+
+BranchManager::~BranchManager() = default;
+
+std::unique_ptr<BranchManager> BranchManager::create(vclink::CMAdapter &adapter)
+{
+    return std::make_unique<BasicBranchManager>(dynamic_cast<GitAdapter &>(adapter));
+}
+
+} // namespace vclink::git

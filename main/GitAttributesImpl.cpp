@@ -1,0 +1,67 @@
+// SPDX-License-Identifier: MIT
+#include "main/GitAttributesImpl.hpp"
+
+#include <string>
+
+#include <git2/attr.h>
+
+#include "error/errorUtil/GitResult.hpp"
+#include "fl/i18n/convert.hpp"
+#include "vclink/git/GitException.hpp"
+#include "vclink/git/messageIdentifiers.hpp"
+
+namespace vclink::git
+{
+namespace
+{
+
+using State = decltype(GitAttribute::attributeValue);
+
+/// @param value what git_attr_get gave
+State classify(const char *value)
+{
+    switch (git_attr_value(value))
+    {
+    case GIT_ATTR_VALUE_UNSPECIFIED:
+        return GitAttribute::Unspecified();
+    case GIT_ATTR_VALUE_TRUE:
+        return GitAttribute::Set();
+    case GIT_ATTR_VALUE_FALSE:
+        return GitAttribute::Unset();
+    case GIT_ATTR_VALUE_STRING:
+        return GitAttribute::Value{fl::i18n::utf8_to_ustring(value)};
+    }
+    throw GitException(shared_vclink::git::InvalidGitAttributeValue(value));
+}
+
+} // namespace
+
+GitAttributesImpl::GitAttributesImpl(GitAdapter &adapter) : adapter_(adapter)
+{
+    const OwnedHandle<git_repository> repository = adapter_.getRepository();
+    // Dropped, which is meant: no query depends on it.
+    static_cast<void>(makeResult(git_attr_cache_flush(repository.get())));
+}
+
+GitAttributesImpl::~GitAttributesImpl() = default;
+
+GitAttribute GitAttributesImpl::getAttribute(const upath &path, const ustring &name)
+{
+    const OwnedHandle<git_repository> repository = adapter_.getRepository();
+    const std::string file = fl::i18n::ustring_to_utf8(path.string());
+    const std::string attribute = fl::i18n::ustring_to_utf8(name);
+    const char *value = nullptr;
+    makeResult(git_attr_get(&value, repository.get(), GIT_ATTR_CHECK_FILE_THEN_INDEX, file.c_str(),
+                            attribute.c_str()))
+        .value();
+    return {name, classify(value)};
+}
+
+GitAttributes::~GitAttributes() = default;
+
+std::unique_ptr<GitAttributes> GitAttributes::create(vclink::CMAdapter &adapter)
+{
+    return std::make_unique<GitAttributesImpl>(dynamic_cast<GitAdapter &>(adapter));
+}
+
+} // namespace vclink::git

@@ -1,0 +1,119 @@
+// SPDX-License-Identifier: MIT
+#include "vclink/git/GitConfig.hpp"
+
+#include <string>
+
+#include <git2/buffer.h>
+#include <git2/config.h>
+
+#include "error/errorUtil/GitResult.hpp"
+#include "fl/i18n/convert.hpp"
+#include "main/toolCommands.hpp"
+#include "scl/core/memory/make_unique_incomplete.hpp"
+#include "vclink/git/LibGit2Guard.hpp"
+
+namespace vclink::git
+{
+namespace
+{
+
+/// A buffer that libgit2 fills.
+class Buffer
+{
+  public:
+    Buffer() = default;
+    Buffer(const Buffer &) = delete;
+    Buffer &operator=(const Buffer &) = delete;
+    ~Buffer()
+    {
+        git_buf_dispose(&buffer_);
+    }
+
+    git_buf *get() noexcept
+    {
+        return &buffer_;
+    }
+    ustring text() const
+    {
+        return fl::i18n::utf8_to_ustring(std::string(buffer_.ptr, buffer_.size));
+    }
+
+  private:
+    git_buf buffer_ = {};
+};
+
+/// A failure counts as no value, which is meant.
+std::optional<ustring> read(git_config *config, const ConfigKey &key)
+{
+    Buffer value;
+    if (git_config_get_string_buf(value.get(), config, configKeyString(key).c_str()) != 0)
+    {
+        return std::nullopt;
+    }
+    return value.text();
+}
+
+void write(git_config *config, const ToolCommand &tool)
+{
+    const std::string key = configKeyString(tool.key);
+    const std::string value = quotedCommand(toolLauncherPath(tool), tool.arguments);
+    makeResult(git_config_set_string(config, key.c_str(), value.c_str())).value();
+}
+
+} // namespace
+
+struct GitConfig::Impl
+{
+    LibGit2Guard guard;
+    OwnedHandle<git_config> defaultConfig = acquire<git_config>(git_config_open_default).value();
+    OwnedHandle<git_config> globalConfig =
+        acquire<git_config>(git_config_open_global, defaultConfig.get()).value();
+};
+
+GitConfig::GitConfig() : impl_(scl::core::memory::make_unique_incomplete<Impl, Impl>())
+{
+}
+
+GitConfig::~GitConfig() = default;
+
+std::optional<upath> GitConfig::globalFilePath() const
+{
+    Buffer path;
+    if (git_config_find_global(path.get()) != 0)
+    {
+        return std::nullopt;
+    }
+    return upath(path.text());
+}
+
+std::optional<ustring> GitConfig::readAutoMergeDriver() const
+{
+    return read(impl_->globalConfig.get(), autoMergeDriver().key);
+}
+
+std::optional<ustring> GitConfig::readMergeTool() const
+{
+    return read(impl_->globalConfig.get(), mergeTool().key);
+}
+
+std::optional<ustring> GitConfig::readDiffTool() const
+{
+    return read(impl_->globalConfig.get(), diffTool().key);
+}
+
+void GitConfig::writeAutoMergeDriver()
+{
+    write(impl_->globalConfig.get(), autoMergeDriver());
+}
+
+void GitConfig::writeMergeTool()
+{
+    write(impl_->globalConfig.get(), mergeTool());
+}
+
+void GitConfig::writeDiffTool()
+{
+    write(impl_->globalConfig.get(), diffTool());
+}
+
+} // namespace vclink::git

@@ -1,0 +1,94 @@
+// SPDX-License-Identifier: MIT
+#include <string>
+#include <vector>
+
+#include <git2/commit.h>
+#include <git2/index.h>
+#include <git2/oid.h>
+#include <git2/repository.h>
+
+#include "error/errorUtil/GitResult.hpp"
+#include "error/errorUtil/callbackException.hpp"
+#include "fl/i18n/convert.hpp"
+#include "main/GitAdapter.hpp"
+#include "main/commitIdentity.hpp"
+#include "main/indexRefresh.hpp"
+#include "util/repository.hpp"
+
+namespace vclink::git
+{
+namespace
+{
+
+int collectMergeHead(const git_oid *id, void *payload) noexcept
+{
+    try
+    {
+        static_cast<std::vector<git_oid> *>(payload)->push_back(*id);
+        return 0;
+    }
+    catch (...)
+    {
+        return parkCallbackException();
+    }
+}
+
+std::vector<OwnedHandle<git_commit>> lookupMergeHeads(git_repository *repository)
+{
+    std::vector<git_oid> ids;
+    makeResult(git_repository_mergehead_foreach(repository, collectMergeHead, &ids)).value();
+    std::vector<OwnedHandle<git_commit>> commits;
+    commits.reserve(ids.size());
+    for (const git_oid &id : ids)
+    {
+        commits.push_back(acquire<git_commit>(git_commit_lookup, repository, &id).value());
+    }
+    return commits;
+}
+
+} // namespace
+
+void GitAdapter::commit(const upath & /*folder*/, const ustring &message)
+{
+    const OwnedHandle<git_repository> repository = openRepository(root_);
+    // Without a commit at HEAD, for whatever reason, the new commit is a root commit.
+    const GitResult<OwnedHandle<git_commit>> head = lookupCommitByName("HEAD", repository.get());
+    std::vector<OwnedHandle<git_commit>> mergeHeads;
+    std::vector<const git_commit *> parents;
+    if (head.has_value())
+    {
+        parents.push_back(head.value().get());
+    }
+    if (git_repository_state(repository.get()) == GIT_REPOSITORY_STATE_MERGE)
+    {
+        mergeHeads = lookupMergeHeads(repository.get());
+        for (const auto &mergeHead : mergeHeads)
+        {
+            parents.push_back(mergeHead.get());
+        }
+    }
+    createCommit(repository.get(), message, parents);
+}
+
+void GitAdapter::createCommit(git_repository *repository, const ustring &message,
+                              const std::vector<const git_commit *> &parents)
+{
+    // First, so that a missing identity fails with nothing touched.
+    const OwnedHandle<git_signature> signature = makeSignature(repository);
+    const OwnedHandle<git_index> index = getRepositoryIndex(repository);
+    refreshIndex(repository, index.get());
+    writeIndex(index.get());
+    const std::string text = fl::i18n::ustring_to_utf8(message);
+    const git_oid treeId = writeIndexTree(index.get());
+    const OwnedHandle<git_tree> tree = lookupTree(repository, &treeId);
+    git_oid id{};
+    // libgit2's parameter is not const throughout.
+    auto parentPointers = parents;
+    makeResult(git_commit_create(&id, repository, "HEAD", signature.get(), signature.get(), "UTF-8",
+                                 text.c_str(), tree.get(), parentPointers.size(),
+                                 parentPointers.data()))
+        .value();
+    makeResult(git_repository_state_cleanup(repository)).value();
+}
+
+} // namespace vclink::git

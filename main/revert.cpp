@@ -1,0 +1,116 @@
+// SPDX-License-Identifier: MIT
+#include <algorithm>
+#include <memory>
+#include <string>
+
+#include <git2/checkout.h>
+#include <git2/index.h>
+#include <git2/reset.h>
+
+#include "error/errorUtil/GitResult.hpp"
+#include "error/raise.hpp"
+#include "fl/i18n/convert.hpp"
+#include "main/GitAdapter.hpp"
+#include "main/LinkGuard.hpp"
+#include "options/gitRecords.hpp"
+#include "util/PathspecArray.hpp"
+#include "util/repository.hpp"
+#include "vclink/git/messageIdentifiers.hpp"
+#include "vclink/util/generateFileReport.hpp"
+
+namespace vclink::git
+{
+namespace
+{
+
+/// A key of the states without the root's text; empty when it does not lie below the root.
+std::string nameBelow(const std::string &root, const std::string &key)
+{
+    const bool isBelow = key.size() > root.size() && key.compare(0, root.size(), root) == 0 &&
+                         (root.empty() || root.back() == '/' || key[root.size()] == '/');
+    const auto begin = isBelow ? key.find_first_not_of('/', root.size()) : std::string::npos;
+    return begin == std::string::npos ? std::string() : key.substr(begin);
+}
+
+/// The names, relative to the root, of the changed files that HEAD holds.
+std::vector<std::string> changedNames(const FileStateMap &states, const upath &root)
+{
+    const std::string rootText = fl::i18n::ustring_to_utf8(root.string());
+    std::vector<std::string> names;
+    for (const auto &[path, state] : states)
+    {
+        const FileState::State number = state.getState();
+        if (number != FileState::Clean && number != FileState::Unversioned &&
+            number != FileState::Added)
+        {
+            names.push_back(nameBelow(rootText, fl::i18n::ustring_to_utf8(path.string())));
+        }
+    }
+    return names;
+}
+
+bool areIndexed(git_repository *repository, const std::vector<std::string> &names)
+{
+    const OwnedHandle<git_index> index = getRepositoryIndex(repository);
+    return std::all_of(names.begin(), names.end(),
+                       [&index](const std::string &name)
+                       { return git_index_get_bypath(index.get(), name.c_str(), 0) != nullptr; });
+}
+
+void resetEntries(git_repository *repository, const git_object *head, const PathspecArray &pathspec,
+                  const std::vector<std::string> &names)
+{
+    makeResult(git_reset_default(repository, head, getArrayPointer(pathspec))).value();
+    // A file whose kind was changed in the index, to a link or from one, is taken out of it by the
+    // first reset, and put back by the second.
+    if (head != nullptr && !names.empty() && !areIndexed(repository, names))
+    {
+        makeResult(git_reset_default(repository, head, getArrayPointer(pathspec))).value();
+    }
+}
+
+} // namespace
+
+FileStateMap GitAdapter::throwIfConflicted(const std::vector<upath> &files)
+{
+    FileStateMap states = getFileStates(files);
+    std::vector<upath> conflicted;
+    for (const auto &[path, state] : states)
+    {
+        if (state.getState() == FileState::InConflict)
+        {
+            conflicted.push_back(path);
+        }
+    }
+    if (!conflicted.empty())
+    {
+        raise(shared_vclink::git::Conflicted(vclink::util::generateFileReport(conflicted)));
+    }
+    return states;
+}
+
+void GitAdapter::revertFiles(const std::vector<upath> &files)
+{
+    const FileStateMap states = throwIfConflicted(files);
+    if (files.empty())
+    {
+        return;
+    }
+    const PathspecArray pathspec = makeFilePathspec(files, root_);
+    const OwnedHandle<git_repository> repository = openRepository(root_);
+    // Without a HEAD the reset takes the paths out of the index.
+    const GitResult<OwnedHandle<git_object>> head = revparseObject(repository.get(), "HEAD");
+    const std::vector<std::string> names = changedNames(states, root_);
+    resetEntries(repository.get(), head.has_value() ? head.value().get() : nullptr, pathspec,
+                 names);
+    const std::shared_ptr<GitOptionsFactory> factory = optionsFactory_;
+    CheckoutOptions options = factory->makeCheckoutOptions();
+    options.checkoutStrategy = GIT_CHECKOUT_FORCE | GIT_CHECKOUT_RECREATE_MISSING;
+    git_checkout_options record = toGitCheckoutOptions(options, callbacks_->checkoutCallbacks());
+    record.paths = getArray(pathspec);
+    LinkGuard links(repository.get(), record);
+    makeResult(git_checkout_index(repository.get(), nullptr, &record)).value();
+    links.hasSucceeded();
+}
+
+} // namespace vclink::git

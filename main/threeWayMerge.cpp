@@ -1,0 +1,137 @@
+// SPDX-License-Identifier: MIT
+#include <git2/attr.h>
+#include <git2/checkout.h>
+#include <git2/errors.h>
+#include <git2/index.h>
+#include <git2/merge.h>
+#include <git2/refs.h>
+
+#include "error/errorUtil/GitResult.hpp"
+#include "error/logging/logger.hpp"
+#include "error/raise.hpp"
+#include "fl/i18n/convert.hpp"
+#include "main/BranchMerger.hpp"
+#include "main/LinkGuard.hpp"
+#include "options/gitRecords.hpp"
+#include "util/PathspecArray.hpp"
+#include "util/pathspecEscape.hpp"
+#include "util/repository.hpp"
+#include "vclink/git/messageIdentifiers.hpp"
+
+namespace vclink::git
+{
+namespace
+{
+
+/// What the working tree's attribute files, and then the index's, say of a file. A failure counts
+/// as no attribute.
+git_attr_value_t readAttribute(git_repository *repository, const char *path, const char *name)
+{
+    const char *value = nullptr;
+    static_cast<void>(git_attr_get(&value, repository, 0, path, name));
+    return git_attr_value(value);
+}
+
+bool isUnmergeable(git_repository *repository, const char *path)
+{
+    const git_attr_value_t merge = readAttribute(repository, path, "merge");
+    const git_attr_value_t text = readAttribute(repository, path, "text");
+    return merge == GIT_ATTR_VALUE_FALSE ||
+           (text == GIT_ATTR_VALUE_FALSE && merge == GIT_ATTR_VALUE_STRING);
+}
+
+std::vector<ustring> listUnmergeable(git_repository *repository, git_index *index)
+{
+    const OwnedHandle<git_index_conflict_iterator> iterator =
+        acquire<git_index_conflict_iterator>(git_index_conflict_iterator_new, index).value();
+    std::vector<ustring> paths;
+    for (;;)
+    {
+        const git_index_entry *ancestor = nullptr;
+        const git_index_entry *ours = nullptr;
+        const git_index_entry *theirs = nullptr;
+        const GitResult<void> next =
+            makeResult(git_index_conflict_next(&ancestor, &ours, &theirs, iterator.get()));
+        if (next.has_error() && next.error().getCode() == GIT_ITEROVER)
+        {
+            return paths;
+        }
+        next.value();
+        collectUnmergeable(repository, paths, ancestor);
+        collectUnmergeable(repository, paths, ours);
+        collectUnmergeable(repository, paths, theirs);
+    }
+}
+
+/// As patterns that match these names only.
+std::vector<ustring> makeExactPatterns(const std::vector<ustring> &paths)
+{
+    std::vector<ustring> patterns;
+    patterns.reserve(paths.size());
+    for (const ustring &path : paths)
+    {
+        const std::string name = fl::i18n::ustring_to_utf8(path);
+        patterns.push_back(fl::i18n::utf8_to_ustring(escapeExactPathspec(name)));
+    }
+    return patterns;
+}
+
+} // namespace
+
+void collectUnmergeable(git_repository *repository, std::vector<ustring> &paths,
+                        const git_index_entry *entry)
+{
+    if (entry == nullptr || entry->path == nullptr || !isUnmergeable(repository, entry->path))
+    {
+        return;
+    }
+    writeRecord(SeverityDiagnostic, "Conflicted entry is not mergeable: ", entry->path);
+    paths.push_back(fl::i18n::utf8_to_ustring(entry->path));
+}
+
+void BranchMerger::threeWayMerge(const BranchName &name, git_repository *repository,
+                                 git_annotated_commit *theirs)
+{
+    CheckoutOptions options = optionsFactory_->makeCheckoutOptions();
+    options.checkoutStrategy = GIT_CHECKOUT_FORCE | GIT_CHECKOUT_ALLOW_CONFLICTS;
+    const MergeOptions mergeOptions = optionsFactory_->makeMergeOptions();
+    git_checkout_options checkoutRecord =
+        toGitCheckoutOptions(options, callbacks_->checkoutCallbacks());
+    const git_merge_options mergeRecord = toGitMergeOptions(mergeOptions);
+    const git_annotated_commit *heads[] = {theirs};
+    LinkGuard links(repository, checkoutRecord);
+    makeResult(git_merge(repository, heads, 1, &mergeRecord, &checkoutRecord)).value();
+    links.hasSucceeded();
+    const OwnedHandle<git_index> index = getRepositoryIndex(repository);
+    if (git_index_has_conflicts(index.get()) != 0)
+    {
+        endWithConflicts(repository, index.get(), checkoutRecord);
+    }
+    commitMerge(name, repository);
+}
+
+void BranchMerger::commitMerge(const BranchName &name, git_repository *repository)
+{
+    const bool isReference =
+        acquire<git_reference>(git_reference_dwim, repository, name.c_str()).has_value();
+    const std::string message = (isReference ? "Merge branch '" : "Merge commit '") + name + "'";
+    vclink::CMAdapter &adapter = adapter_;
+    adapter.commit(upath(), fl::i18n::utf8_to_ustring(message));
+}
+
+void BranchMerger::endWithConflicts(git_repository *repository, git_index *index,
+                                    const git_checkout_options &options)
+{
+    const std::vector<ustring> paths = listUnmergeable(repository, index);
+    if (!paths.empty())
+    {
+        git_checkout_options copy = options;
+        const PathspecArray pathspec = makeStringPathspec(makeExactPatterns(paths));
+        copy.paths = getArray(pathspec);
+        copy.checkout_strategy |= GIT_CHECKOUT_USE_OURS;
+        makeResult(git_checkout_index(repository, nullptr, &copy)).value();
+    }
+    raise(shared_vclink::git::HasConflicts());
+}
+
+} // namespace vclink::git

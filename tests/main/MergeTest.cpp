@@ -1,0 +1,216 @@
+// SPDX-License-Identifier: MIT
+#include "MergeTest.hpp"
+
+#include <algorithm>
+#include <ostream>
+#include <tuple>
+#include <typeinfo>
+
+#include <boost/variant/get.hpp>
+#include <gtest/gtest.h>
+
+#include "support/text.hpp"
+#include "vclink/git/GitException.hpp"
+#include "vclink/git/messageIdentifiers.hpp"
+
+namespace vclink::test
+{
+namespace
+{
+
+auto members(const MergeOutcome &outcome)
+{
+    return std::tie(outcome.parents, outcome.tree, outcome.mergeHead, outcome.index,
+                    outcome.workingTree);
+}
+
+/// Cuts what stands behind each run of these seven characters and a blank, up to the line's end.
+void cutLabels(std::string &text, const std::string &marker)
+{
+    for (auto at = text.find(marker); at != std::string::npos; at = text.find(marker, at + 1))
+    {
+        const auto begin = at + marker.size();
+        const auto end = std::min(text.find('\n', begin), text.size());
+        text.erase(begin, end - begin);
+    }
+}
+
+RepositoryState::Entries withoutLabels(RepositoryState::Entries entries)
+{
+    for (auto &[name, content] : entries)
+    {
+        cutLabels(content, "<<<<<<< ");
+        cutLabels(content, ">>>>>>> ");
+    }
+    return entries;
+}
+
+void print(std::ostream &stream, const RepositoryState::Entries &entries)
+{
+    for (const auto &[name, content] : entries)
+        stream << "  " << testing::PrintToString(name) << ": " << testing::PrintToString(content)
+               << '\n';
+}
+
+} // namespace
+
+MergeOutcome outcomeIn(const GitRepository &repository)
+{
+    MergeOutcome outcome;
+    outcome.parents = repository.tryGit({"log", "-1", "--format=%P"}).output;
+    outcome.tree = repository.tryGit({"rev-parse", "--quiet", "HEAD^{tree}"}).output;
+    outcome.mergeHead =
+        repository.tryGit({"rev-parse", "--quiet", "--verify", "MERGE_HEAD"}).output;
+    outcome.index = indexOf(repository);
+    outcome.workingTree = withoutLabels(workingTreeOf(repository));
+    return outcome;
+}
+
+bool operator==(const MergeOutcome &left, const MergeOutcome &right)
+{
+    return members(left) == members(right);
+}
+
+std::ostream &operator<<(std::ostream &stream, const MergeOutcome &outcome)
+{
+    stream << "parents " << outcome.parents << "tree " << outcome.tree << "merge head "
+           << outcome.mergeHead << "\nindex:\n";
+    print(stream, outcome.index);
+    stream << "working tree:\n";
+    print(stream, outcome.workingTree);
+    return stream;
+}
+
+MergeTest::MergeTest()
+{
+    repository_.write("file", "1\n2\n3\n4\n5\n6\n7\n8\n9\n");
+    repository_.write("other", "other\n");
+    repository_.commitAll("first");
+}
+
+std::string MergeTest::failureOfMerge(const std::string &name) const
+{
+    try
+    {
+        merge(name);
+        ADD_FAILURE() << "no exception";
+    }
+    catch (const git::GitException &exception)
+    {
+        const vclink::exception::SourceControlException &base = exception;
+        EXPECT_EQ(typeid(base), typeid(git::GitException));
+        EXPECT_EQ(exception.GetID(), "shared_vclink:git:MergeFailed");
+        const auto &arguments = exception.GetBaseMsgIDObj().getArguments();
+        EXPECT_EQ(arguments.size(), 1U);
+        EXPECT_EQ(boost::get<std::string>(arguments.at(0)), name);
+        const std::string text = asUtf8(exception.GetUnicodeMessageTxt());
+        const std::string first = textOf(shared_vclink::git::MergeFailed(name)) + '\n';
+        EXPECT_EQ(text.substr(0, first.size()), first);
+        return text.substr(std::min(first.size(), text.size()));
+    }
+    return {};
+}
+
+void MergeTest::expectConflicts(const std::string &name) const
+{
+    EXPECT_EQ(failureOfMerge(name), textOf(shared_vclink::git::HasConflicts()));
+    EXPECT_EQ(branches().getRepositoryState(), "Conflicts");
+}
+
+void MergeTest::makeBranch(const std::string &name, const std::function<void()> &change,
+                           const std::string &start)
+{
+    repository_.git({"checkout", "--quiet", "-b", name, start});
+    change();
+    repository_.commitAll("on " + name);
+    repository_.git({"checkout", "--quiet", "main"});
+}
+
+std::function<void()> MergeTest::writing(const std::string &name, const std::string &bytes) const
+{
+    return [=] { repository_.write(name, bytes); };
+}
+
+void MergeTest::diverge(const std::function<void()> &ours, const std::function<void()> &theirs)
+{
+    makeBranch("topic", theirs);
+    ours();
+    repository_.commitAll("on main");
+}
+
+GitRepository MergeTest::makeTwin() const
+{
+    const GitRepository twin(folder() / "twin");
+    std::filesystem::remove_all(twin.path());
+    const auto copied =
+        Command({"cp", "-a", repository_.path().string(), twin.path().string()}).run();
+    EXPECT_TRUE(copied.succeeded()) << copied.errors;
+    return twin;
+}
+
+MergeOutcome MergeTest::outcomeByGit(const std::string &name) const
+{
+    const GitRepository twin = makeTwin();
+    twin.tryGit({"merge", "--quiet", "--no-edit", name});
+    return outcomeIn(twin);
+}
+
+MergeOutcome MergeTest::outcomeByLibrary(const std::string &name) const
+{
+    try
+    {
+        merge(name);
+    }
+    catch (const git::GitException &exception)
+    {
+        const std::string text = asUtf8(exception.GetUnicodeMessageTxt());
+        const std::string conflicts = textOf(shared_vclink::git::HasConflicts());
+        EXPECT_NE(text.find(conflicts), std::string::npos) << text;
+    }
+    return outcomeIn(repository_);
+}
+
+void MergeTest::expectAsGit(const std::string &name) const
+{
+    const MergeOutcome expected = outcomeByGit(name);
+    EXPECT_EQ(outcomeByLibrary(name), expected);
+}
+
+void MergeTest::expectCleanAsGit() const
+{
+    const std::string ours = idOf("HEAD");
+    expectAsGit();
+    EXPECT_EQ(parents(), (std::vector<std::string>{ours, idOf("topic")}));
+    EXPECT_EQ(status(), std::vector<std::string>());
+    EXPECT_EQ(branches().getRepositoryState(), "Normal");
+    EXPECT_EQ(stateOf(repository_).underWay.count("MERGE_HEAD"), 0U);
+}
+
+void MergeTest::expectConflictsAsGit(const std::vector<std::string> &expected) const
+{
+    const std::string ours = idOf("HEAD");
+    expectAsGit();
+    EXPECT_EQ(conflicts(), expected);
+    EXPECT_EQ(idOf("HEAD"), ours);
+    EXPECT_EQ(branches().getRepositoryState(), "Conflicts");
+}
+
+std::vector<std::string> MergeTest::conflicts() const
+{
+    std::vector<std::string> lines =
+        splitLines(repository_.git({"ls-files", "--unmerged", "--format=%(stage) %(path)"}));
+    return lines;
+}
+
+std::string MergeTest::message() const
+{
+    const std::string commit = repository_.git({"cat-file", "commit", "HEAD"});
+    return commit.substr(commit.find("\n\n") + 2);
+}
+
+std::vector<std::string> MergeTest::parents() const
+{
+    return splitLines(repository_.git({"rev-parse", "HEAD^@"}));
+}
+
+} // namespace vclink::test

@@ -1,0 +1,200 @@
+// SPDX-License-Identifier: MIT
+#include "RepositoryState.hpp"
+
+#include <array>
+#include <cerrno>
+#include <fstream>
+#include <functional>
+#include <iterator>
+#include <ostream>
+#include <sstream>
+#include <system_error>
+#include <tuple>
+
+#include <gtest/gtest.h>
+#include <sys/stat.h>
+
+namespace vclink::test
+{
+namespace
+{
+
+namespace fs = std::filesystem;
+
+constexpr std::array filesUnderWay{"MERGE_HEAD",       "MERGE_MSG",   "MERGE_MODE",
+                                   "CHERRY_PICK_HEAD", "REVERT_HEAD", "BISECT_LOG",
+                                   "ORIG_HEAD",        "index.lock",  "HEAD.lock"};
+constexpr std::size_t longestContent = 120;
+
+std::string readFile(const fs::path &file)
+{
+    std::ifstream stream(file, std::ios::binary);
+    return {std::istreambuf_iterator<char>(stream), {}};
+}
+
+std::string shortened(const std::string &bytes)
+{
+    if (bytes.size() <= longestContent)
+        return bytes;
+    return std::to_string(bytes.size()) + " bytes of hash " +
+           std::to_string(std::hash<std::string>()(bytes));
+}
+
+fs::path gitFolder(const GitRepository &repository)
+{
+    return repository.line({"rev-parse", "--absolute-git-dir"});
+}
+
+std::string contentOf(const fs::directory_entry &entry)
+{
+    if (entry.is_symlink())
+        return "link to " + fs::read_symlink(entry.path()).string();
+    std::ostringstream text;
+    text << std::oct << static_cast<unsigned>(entry.status().permissions()) << ' '
+         << (entry.is_directory() ? "folder" : shortened(readFile(entry.path())));
+    return text.str();
+}
+
+void print(std::ostream &stream, const char *title, const RepositoryState::Entries &entries)
+{
+    stream << title << ":\n";
+    for (const auto &[name, content] : entries)
+        stream << "  " << testing::PrintToString(name) << ": " << testing::PrintToString(content)
+               << '\n';
+}
+
+std::int64_t nanoseconds(const timespec &time)
+{
+    return std::int64_t{time.tv_sec} * 1'000'000'000 + time.tv_nsec;
+}
+
+auto members(const RepositoryState &state)
+{
+    return std::tie(state.head, state.references, state.reflog, state.underWay, state.index,
+                    state.workingTree);
+}
+
+auto members(const FileStamp &stamp)
+{
+    return std::tie(stamp.inode, stamp.modified, stamp.changed, stamp.bytes);
+}
+
+} // namespace
+
+RepositoryState stateOf(const GitRepository &repository)
+{
+    const fs::path folder = gitFolder(repository);
+    RepositoryState state;
+    state.head = repository.tryGit({"symbolic-ref", "--quiet", "HEAD"}).output +
+                 repository.tryGit({"rev-parse", "--quiet", "--verify", "HEAD"}).output;
+    state.references = repository.git({"for-each-ref", "--format=%(refname) %(objectname)"});
+    state.reflog = readFile(folder / "logs/HEAD");
+    for (const auto *name : filesUnderWay)
+    {
+        if (fs::exists(folder / name))
+            state.underWay.emplace(name, readFile(folder / name));
+    }
+    state.index = indexOf(repository);
+    state.workingTree = workingTreeOf(repository);
+    return state;
+}
+
+RepositoryState::Entries indexOf(const GitRepository &repository)
+{
+    RepositoryState::Entries entries;
+    std::istringstream stream(repository.git({"ls-files", "-v", "--stage", "-z"}));
+    for (std::string record; std::getline(stream, record, '\0');)
+    {
+        const auto tab = record.find('\t');
+        std::string &lines = entries[record.substr(tab + 1)];
+        lines += (lines.empty() ? "" : "\n") + record.substr(0, tab);
+    }
+    return entries;
+}
+
+RepositoryState::Entries workingTreeOf(const GitRepository &repository)
+{
+    RepositoryState::Entries entries;
+    fs::recursive_directory_iterator entry(repository.path());
+    for (; entry != fs::recursive_directory_iterator(); ++entry)
+    {
+        if (entry->path() == repository / ".git")
+        {
+            entry.disable_recursion_pending();
+            continue;
+        }
+        entries.emplace(entry->path().lexically_relative(repository.path()).string(),
+                        contentOf(*entry));
+    }
+    return entries;
+}
+
+bool operator==(const RepositoryState &left, const RepositoryState &right)
+{
+    return members(left) == members(right);
+}
+
+bool operator!=(const RepositoryState &left, const RepositoryState &right)
+{
+    return !(left == right);
+}
+
+std::ostream &operator<<(std::ostream &stream, const RepositoryState &state)
+{
+    stream << "HEAD:\n"
+           << state.head << "references:\n"
+           << state.references << "reflog:\n"
+           << state.reflog;
+    print(stream, "under way", state.underWay);
+    print(stream, "index", state.index);
+    print(stream, "working tree", state.workingTree);
+    return stream;
+}
+
+FileStamp stampOf(const fs::path &file)
+{
+    struct stat status = {};
+    if (::lstat(file.c_str(), &status) != 0)
+    {
+        if (errno == ENOENT)
+            return {};
+        throw std::system_error(errno, std::generic_category(), file.string());
+    }
+    const bool isFile = S_ISREG(status.st_mode);
+    return {status.st_ino, nanoseconds(status.st_mtim), nanoseconds(status.st_ctim),
+            isFile ? readFile(file) : std::string()};
+}
+
+FileStamp indexStampOf(const GitRepository &repository)
+{
+    return stampOf(gitFolder(repository) / "index");
+}
+
+bool operator==(const FileStamp &left, const FileStamp &right)
+{
+    return members(left) == members(right);
+}
+
+bool operator!=(const FileStamp &left, const FileStamp &right)
+{
+    return !(left == right);
+}
+
+std::ostream &operator<<(std::ostream &stream, const FileStamp &stamp)
+{
+    return stream << "inode " << stamp.inode << ", modified " << stamp.modified << ", changed "
+                  << stamp.changed << ", " << stamp.bytes.size() << " bytes";
+}
+
+NothingChanges::NothingChanges(const GitRepository &repository)
+    : repository_(repository), state_(stateOf(repository)), index_(indexStampOf(repository))
+{
+}
+
+NothingChanges::~NothingChanges()
+{
+    EXPECT_EQ(indexStampOf(repository_), index_);
+    EXPECT_EQ(stateOf(repository_), state_);
+}
+
+} // namespace vclink::test

@@ -1,0 +1,84 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <cstdint>
+#include <filesystem>
+#include <iosfwd>
+#include <map>
+#include <string>
+
+#include "support/GitRepository.hpp"
+
+namespace vclink::test
+{
+
+/// What a repository holds, as git's own commands and the file system tell it: taken before and
+/// after an operation, it shows what the operation changed. Only reads, and writes nothing. Objects
+/// that nothing refers to do not count.
+struct RepositoryState
+{
+    /// Names relative to the root as bytes, with what stands there.
+    using Entries = std::map<std::string, std::string>;
+
+    /// The branch that HEAD names, if any, and the commit's id, if there is one.
+    std::string head;
+    /// Every reference with what it names.
+    std::string references;
+    /// HEAD's own reflog.
+    std::string reflog;
+    /// The files of a merge, cherry-pick, revert or bisection that is under way, and a lock.
+    Entries underWay;
+    /// `git ls-files -v --stage`: tag, mode, id and stage of each name, a line a stage.
+    Entries index;
+    /// Mode and content of each file below the root, the repository's own folder left out. Long
+    /// contents are told by length and hash.
+    Entries workingTree;
+};
+
+/// @throws std::runtime_error when git can't tell
+RepositoryState stateOf(const GitRepository &repository);
+/// The index alone.
+RepositoryState::Entries indexOf(const GitRepository &repository);
+/// The working tree alone.
+RepositoryState::Entries workingTreeOf(const GitRepository &repository);
+
+bool operator==(const RepositoryState &left, const RepositoryState &right);
+bool operator!=(const RepositoryState &left, const RepositoryState &right);
+std::ostream &operator<<(std::ostream &stream, const RepositoryState &state);
+
+/// A file's identity, times and bytes: two that are equal tell that nobody wrote the file between
+/// them, not even with the same bytes. A missing file has one, too.
+struct FileStamp
+{
+    std::uintmax_t inode = 0;
+    std::int64_t modified = 0;
+    std::int64_t changed = 0;
+    std::string bytes;
+};
+
+/// @throws std::system_error when the file can't be examined
+FileStamp stampOf(const std::filesystem::path &file);
+/// Of the repository's index file.
+FileStamp indexStampOf(const GitRepository &repository);
+
+bool operator==(const FileStamp &left, const FileStamp &right);
+bool operator!=(const FileStamp &left, const FileStamp &right);
+std::ostream &operator<<(std::ostream &stream, const FileStamp &stamp);
+
+/// Fails the running test at its end when the repository's state is another than at its start, or
+/// when anybody wrote the index file.
+class NothingChanges
+{
+  public:
+    explicit NothingChanges(const GitRepository &repository);
+    NothingChanges(const NothingChanges &) = delete;
+    NothingChanges &operator=(const NothingChanges &) = delete;
+    ~NothingChanges();
+
+  private:
+    GitRepository repository_;
+    RepositoryState state_;
+    FileStamp index_;
+};
+
+} // namespace vclink::test

@@ -1,0 +1,301 @@
+// SPDX-License-Identifier: MIT
+#include <cstdint>
+#include <memory>
+#include <stdexcept>
+#include <string>
+#include <vector>
+
+#include <fcntl.h>
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include "LibGit2Calls.hpp"
+#include "StagingTest.hpp"
+#include "TestOptionsFactory.hpp"
+#include "util/pathspecEscape.hpp"
+#include "vclink/util/exception/CancelledOperationException.hpp"
+
+namespace
+{
+
+using shared_vclink::git::Conflicted;
+using testing::ElementsAre;
+using testing::IsEmpty;
+using vclink::git::TagException;
+using vclink::test::asPath;
+using vclink::test::Failure;
+using vclink::test::failureOf;
+using vclink::test::LibGit2Calls;
+using vclink::test::NothingChanges;
+using Names = std::vector<std::string>;
+
+Names operator+(Names left, const Names &right)
+{
+    left.insert(left.end(), right.begin(), right.end());
+    return left;
+}
+
+const Names ofTheQuery{"git_status_options_init", "git_repository_open_ext",
+                       "git_status_foreach_ext", "git_repository_free"};
+const Names toTheReset =
+    ofTheQuery + Names{"git_repository_open_ext", "git_revparse_single", "git_reset_default"};
+/// A look into the repository's index.
+const Names look{"git_repository_index", "git_index_free"};
+const Names makingOptions{"makeCheckoutOptions", "git_checkout_options_init"};
+const Names checkout{"git_checkout_index"};
+const Names released{"git_object_free", "git_repository_free"};
+
+/// The calls of libgit2 that a revert makes.
+class RevertCalls : public vclink::test::StagingTest
+{
+  protected:
+    RevertCalls()
+    {
+        repository_.write("file", "edited");
+        calls_.names.clear();
+        factory_->onCheckoutOptions = [this] { calls_.names.emplace_back("makeCheckoutOptions"); };
+        calls_.onRevparse = [this](const char *text) { revisions_.emplace_back(text); };
+        calls_.onReset = [this](const git_object *target, const git_strarray *pathspec)
+        {
+            targets_.push_back(target == nullptr ? "none" : idOf(target));
+            resetFiles_.push_back(textsOf(*pathspec));
+        };
+        calls_.onCheckout = [this](git_index *index, const git_checkout_options *options)
+        {
+            EXPECT_EQ(index, nullptr);
+            records_.push_back(*options);
+            checkoutFiles_.push_back(textsOf(options->paths));
+        };
+    }
+
+    static std::string idOf(const git_object *object)
+    {
+        return git_oid_tostr_s(git_object_id(object));
+    }
+    static Names textsOf(const git_strarray &pathspec)
+    {
+        return {pathspec.strings, pathspec.strings + pathspec.count};
+    }
+    void revert(const Names &names)
+    {
+        adapter_.revertFiles(files(names));
+    }
+
+    std::shared_ptr<vclink::test::TestOptionsFactory> factory_ =
+        std::make_shared<vclink::test::TestOptionsFactory>(interactor_);
+    vclink::git::GitAdapter adapter_{asPath(repository_.path()), factory_};
+    LibGit2Calls calls_;
+    Names revisions_;
+    Names targets_;
+    std::vector<Names> resetFiles_;
+    std::vector<Names> checkoutFiles_;
+    std::vector<git_checkout_options> records_;
+};
+
+TEST_F(RevertCalls, ResetTheIndexAndCheckItOut)
+{
+    revert({"file"});
+    EXPECT_EQ(calls_.names, toTheReset + look + makingOptions + checkout + released);
+    EXPECT_THAT(calls_.handles, IsEmpty());
+}
+
+TEST_F(RevertCalls, LookForNothingElseWithoutAChange)
+{
+    revert({"other"});
+    EXPECT_EQ(calls_.names, toTheReset + makingOptions + checkout + released);
+}
+
+TEST_F(RevertCalls, ResetASecondTimeWhereAFileIsLostOnTheWay)
+{
+    repository_.remove("file");
+    repository_.symlink("nowhere", "file");
+    repository_.add({"file"});
+    revert({"file"});
+    EXPECT_THAT(targets_, testing::SizeIs(2));
+    EXPECT_THAT(resetFiles_, ElementsAre(ElementsAre("file"), ElementsAre("file")));
+    EXPECT_THAT(calls_.handles, IsEmpty());
+}
+
+TEST_F(RevertCalls, ResetToTheCommitOfHead)
+{
+    revert({"file"});
+    EXPECT_THAT(revisions_, ElementsAre("HEAD"));
+    EXPECT_THAT(targets_, ElementsAre(repository_.line({"rev-parse", "HEAD"})));
+}
+
+TEST_F(RevertCalls, ResetToNothingWithoutAHead)
+{
+    repository_.git({"checkout", "--quiet", "--orphan", "fresh"});
+    revert({"file"});
+    EXPECT_THAT(targets_, ElementsAre("none"));
+    EXPECT_THAT(checkoutFiles_, ElementsAre(ElementsAre("file")));
+    EXPECT_THAT(calls_.handles, IsEmpty());
+}
+
+TEST_F(RevertCalls, ResetToNothingWhyeverHeadFails)
+{
+    calls_.failing = {{"git_revparse_single", GIT_EAUTH}};
+    EXPECT_NO_THROW(revert({"file"}));
+    EXPECT_THAT(targets_, ElementsAre("none"));
+    EXPECT_EQ(vclink::test::indexOf(repository_).count("file"), 0U);
+}
+
+TEST_F(RevertCalls, HaveTheFilesOfTheListInItsOrder)
+{
+    repository_.write("#a", "x");
+    revert({"sub", "#a", "file", "missing", "file", "."});
+    const auto expected =
+        ElementsAre("sub", vclink::git::escapePathspec("#a"), "file", "missing", "file", "..");
+    EXPECT_THAT(resetFiles_, ElementsAre(expected));
+    EXPECT_THAT(checkoutFiles_, ElementsAre(expected));
+}
+
+TEST_F(RevertCalls, CheckOutByForceAndBringBackMissingFiles)
+{
+    revert({"file"});
+    ASSERT_EQ(records_.size(), 1U);
+    EXPECT_EQ(records_[0].checkout_strategy, 6U);
+    EXPECT_EQ(records_[0].checkout_strategy,
+              static_cast<unsigned>(GIT_CHECKOUT_FORCE | GIT_CHECKOUT_RECREATE_MISSING));
+}
+
+TEST_F(RevertCalls, CheckOutByForceWhateverTheFactorySays)
+{
+    for (const std::uint64_t strategy :
+         {std::uint64_t{0}, std::uint64_t{GIT_CHECKOUT_DRY_RUN},
+          std::uint64_t{GIT_CHECKOUT_SAFE | GIT_CHECKOUT_REMOVE_UNTRACKED}, ~std::uint64_t{0}})
+    {
+        factory_->checkoutOptions.checkoutStrategy = strategy;
+        repository_.write("file", "edited");
+        revert({"file"});
+        EXPECT_EQ(records_.back().checkout_strategy, 6U) << strategy;
+        EXPECT_EQ(repository_.read("file"), "content of file\n") << strategy;
+    }
+}
+
+TEST_F(RevertCalls, CheckOutWithTheAdaptersCallbacks)
+{
+    revert({"file"});
+    ASSERT_EQ(records_.size(), 1U);
+    const void *const callbacks = &adapter_.getCallbacks().checkoutCallbacks();
+    EXPECT_EQ(records_[0].version, 1U);
+    EXPECT_EQ(records_[0].notify_flags, static_cast<unsigned>(GIT_CHECKOUT_NOTIFY_ALL));
+    EXPECT_NE(records_[0].progress_cb, nullptr);
+    EXPECT_NE(records_[0].perfdata_cb, nullptr);
+    EXPECT_EQ(records_[0].progress_payload, callbacks);
+    EXPECT_EQ(records_[0].perfdata_payload, callbacks);
+    EXPECT_EQ(records_[0].baseline, nullptr);
+    EXPECT_EQ(records_[0].baseline_index, nullptr);
+    EXPECT_EQ(records_[0].target_directory, nullptr);
+    EXPECT_EQ(records_[0].disable_filters, 0);
+}
+
+/// What keeps the checkout from writing through links stands before them.
+TEST_F(RevertCalls, PassTheNotificationsOnToTheAdaptersCallbacks)
+{
+    revert({"file"});
+    ASSERT_EQ(records_.size(), 1U);
+    EXPECT_NE(records_[0].notify_cb, nullptr);
+    interactor_->cancel();
+    repository_.write("file", "edited");
+    EXPECT_THROW(revert({"file"}), vclink::util::exception::CancelledOperationException);
+}
+
+TEST_F(RevertCalls, WriteThroughNoLink)
+{
+    revert({"file"});
+    ASSERT_EQ(records_.size(), 1U);
+    EXPECT_EQ(records_[0].file_open_flags, O_CREAT | O_TRUNC | O_WRONLY | O_NOFOLLOW);
+}
+
+TEST_F(RevertCalls, AskTheFactoryOnceAndHoldAShareOfIt)
+{
+    std::vector<long> shares;
+    factory_->onCheckoutOptions = [&] { shares.push_back(factory_.use_count()); };
+    revert({"file"});
+    // Besides the test's and the adapter's.
+    EXPECT_THAT(shares, ElementsAre(3));
+    EXPECT_EQ(factory_.use_count(), 2);
+}
+
+TEST_F(RevertCalls, PassAnExceptionOfTheFactoryOn)
+{
+    factory_->onCheckoutOptions = [] { throw std::logic_error("the factory"); };
+    EXPECT_THROW(revert({"file"}), std::logic_error);
+    EXPECT_THAT(records_, IsEmpty());
+    EXPECT_THAT(calls_.handles, IsEmpty());
+}
+
+TEST_F(RevertCalls, OpenTheRootItselfWithoutASearch)
+{
+    Names paths;
+    calls_.onOpen = [&](const char *path, unsigned flags, const char *ceilings)
+    {
+        paths.emplace_back(path);
+        EXPECT_EQ(flags, static_cast<unsigned>(GIT_REPOSITORY_OPEN_NO_SEARCH));
+        EXPECT_EQ(ceilings, nullptr);
+    };
+    revert({"file"});
+    EXPECT_THAT(paths, ElementsAre(repository_.path().string(), repository_.path().string()));
+}
+
+TEST_F(RevertCalls, AreNoneForAnEmptyList)
+{
+    revert({});
+    EXPECT_THAT(calls_.names, IsEmpty());
+}
+
+TEST_F(RevertCalls, AreThoseOfTheQueryAloneWhereAFileIsInConflict)
+{
+    beginMerge({"conflicted"});
+    calls_.names.clear();
+    EXPECT_THROW(revert({"file", "conflicted"}), TagException<Conflicted>);
+    EXPECT_EQ(calls_.names, ofTheQuery);
+    EXPECT_THAT(calls_.handles, IsEmpty());
+}
+
+/// A call that fails, and what follows it.
+class FailingRevertCalls : public RevertCalls
+{
+  protected:
+    void expectFails(const std::string &name, const Names &expected)
+    {
+        SCOPED_TRACE(name);
+        calls_.names.clear();
+        calls_.failing = {{name, GIT_EAUTH}};
+        EXPECT_EQ(failureOf([this] { revert({"file"}); }),
+                  (Failure{GIT_EAUTH, GIT_ERROR_OS, "injected"}));
+        EXPECT_EQ(calls_.names, expected);
+        EXPECT_THAT(calls_.handles, IsEmpty());
+    }
+};
+
+TEST_F(FailingRevertCalls, OfTheOpeningChangeNothing)
+{
+    const NothingChanges nothing(repository_);
+    expectFails("git_repository_open_ext", {"git_status_options_init", "git_repository_open_ext"});
+}
+
+TEST_F(FailingRevertCalls, OfTheResetChangeNothing)
+{
+    const NothingChanges nothing(repository_);
+    expectFails("git_reset_default", toTheReset + released);
+}
+
+TEST_F(FailingRevertCalls, AfterTheResetLeaveItInPlace)
+{
+    repository_.add({"file"});
+    const auto expected = stateAfterGit({{"restore", "--staged", "."}});
+    expectFails("git_checkout_options_init", toTheReset + look + makingOptions + released);
+    EXPECT_EQ(stateOf(repository_), expected);
+}
+
+TEST_F(FailingRevertCalls, OfTheCheckoutLeaveTheResetInPlace)
+{
+    repository_.add({"file"});
+    const auto expected = stateAfterGit({{"restore", "--staged", "."}});
+    expectFails("git_checkout_index", toTheReset + look + makingOptions + checkout + released);
+    EXPECT_EQ(stateOf(repository_), expected);
+}
+
+} // namespace

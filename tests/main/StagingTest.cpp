@@ -1,0 +1,154 @@
+// SPDX-License-Identifier: MIT
+#include "StagingTest.hpp"
+
+#include <filesystem>
+#include <ostream>
+#include <sstream>
+#include <tuple>
+
+#include "support/UnprivilegedUser.hpp"
+#include "vclink/git/LibGit2Exception.hpp"
+
+namespace vclink::test
+{
+
+namespace fs = std::filesystem;
+
+bool operator==(const Failure &left, const Failure &right)
+{
+    return std::tie(left.code, left.errorClass, left.text) ==
+           std::tie(right.code, right.errorClass, right.text);
+}
+
+std::ostream &operator<<(std::ostream &stream, const Failure &failure)
+{
+    return stream << "code " << failure.code << ", class " << failure.errorClass << ": "
+                  << failure.text;
+}
+
+std::string printed(const Failure &failure)
+{
+    return testing::PrintToString(failure);
+}
+
+Failure failureOf(const std::function<void()> &action)
+{
+    try
+    {
+        action();
+        ADD_FAILURE() << "no exception";
+        return {};
+    }
+    catch (const git::LibGit2Exception &exception)
+    {
+        const git::GitError &error = exception.getError();
+        return {error.getCode(), error.getErrorClass(), asUtf8(error.getMessage())};
+    }
+}
+
+StagingTest::StagingTest()
+{
+    for (const auto *name : {"file", "other", "sub/inside"})
+        repository_.write(name, std::string("content of ") + name + "\n");
+    repository_.commitAll("first");
+}
+
+void StagingTest::add(const std::vector<std::string> &names) const
+{
+    makeAdapter(repository_.path())->addFiles(files(names));
+}
+
+void StagingTest::remove(const std::vector<std::string> &names) const
+{
+    makeAdapter(repository_.path())->removeFiles(files(names));
+}
+
+void StagingTest::markResolved(const std::string &name) const
+{
+    makeAdapter(repository_.path())->markResolved(files({name}).front());
+}
+
+void StagingTest::revert(const std::vector<std::string> &names) const
+{
+    makeAdapter(repository_.path())->revertFiles(files(names));
+}
+
+void StagingTest::expectRevertsAsGit(const std::vector<std::string> &names) const
+{
+    std::vector<std::string> restore{"restore", "--source=HEAD", "--staged", "--worktree", "--"};
+    restore.insert(restore.end(), names.begin(), names.end());
+    const RepositoryState expected = stateAfterGit({restore});
+    revert(names);
+    EXPECT_EQ(stateOf(repository_), expected);
+}
+
+std::vector<upath> StagingTest::files(const std::vector<std::string> &names) const
+{
+    return asPaths(inRoot(names));
+}
+
+std::vector<std::string> StagingTest::inRoot(const std::vector<std::string> &names) const
+{
+    std::vector<std::string> paths;
+    for (const auto &name : names)
+        paths.push_back(repository_.path().string() + '/' + name);
+    return paths;
+}
+
+std::vector<std::string> StagingTest::status() const
+{
+    std::istringstream stream(repository_.git({"--no-optional-locks", "status", "--porcelain",
+                                               "--untracked-files=all", "--no-renames", "-z"}));
+    std::vector<std::string> entries;
+    for (std::string entry; std::getline(stream, entry, '\0');)
+        entries.push_back(entry);
+    return entries;
+}
+
+RepositoryState
+StagingTest::stateAfterGit(const std::vector<std::vector<std::string>> &commands) const
+{
+    const fs::path copy = folder() / "copy";
+    fs::remove_all(copy);
+    fs::copy(repository_.path(), copy,
+             fs::copy_options::recursive | fs::copy_options::copy_symlinks);
+    const GitRepository twin(copy);
+    for (const auto &command : commands)
+        twin.git(command);
+    return stateOf(twin);
+}
+
+std::string StagingTest::unprivilegedFailureOf(const std::function<void()> &action) const
+{
+    return runAsUnprivilegedUser([&] { return printed(failureOf(action)); });
+}
+
+void StagingTest::giveAway() const
+{
+    repository_.git({"config", "--global", "--add", "safe.directory", repository_.path().string()});
+    repository_.git(
+        {"config", "--global", "--add", "safe.directory", (folder() / "copy").string()});
+    giveToUnprivilegedUser(folder().path());
+}
+
+void StagingTest::beginMerge(const std::vector<std::string> &names)
+{
+    const auto commitSide = [&](const std::string &content)
+    {
+        for (const auto &name : names)
+            repository_.write(name, content);
+        repository_.commitAll(content);
+    };
+    commitSide("base\n");
+    repository_.git({"branch", "theirs"});
+    commitSide("ours\n");
+    repository_.git({"checkout", "--quiet", "theirs"});
+    commitSide("theirs\n");
+    repository_.git({"checkout", "--quiet", "main"});
+    repository_.tryGit(
+        {"-c", "user.name=T", "-c", "user.email=t@example.com", "merge", "--quiet", "theirs"});
+    for (const auto &name : names)
+        ASSERT_EQ(states(repository_, {name}), (States{{name, "InConflict"}}));
+}
+
+} // namespace vclink::test
