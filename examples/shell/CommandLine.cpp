@@ -19,6 +19,9 @@ namespace
 // their option.
 constexpr char hidingMark = '\0';
 
+// Whatever follows it is its value.
+constexpr const char *freeTextOption = "-m";
+
 bool isMisread(std::string_view argument)
 {
     return argument.substr(0, 1) == "[" || argument == "++";
@@ -32,6 +35,12 @@ std::vector<std::string> readArguments(int argc, const char *const *argv)
     for (int index = 1; index < argc; ++index)
     {
         const std::string argument = argv[index];
+        if (!optionsHaveEnded && argument == freeTextOption && index + 1 < argc)
+        {
+            arguments.push_back(argument);
+            arguments.push_back(hidingMark + std::string(argv[++index]));
+            continue;
+        }
         if (!optionsHaveEnded && argument == "--")
         {
             optionsHaveEnded = true;
@@ -62,6 +71,19 @@ void showHiddenValues(CLI::App &line)
             },
             ""));
     }
+}
+
+std::optional<Progress> parseProgress(const std::string &text)
+{
+    if (text == "auto")
+    {
+        return Progress::WhereSeen;
+    }
+    if (text == "always")
+    {
+        return Progress::Always;
+    }
+    return text == "never" ? std::optional(Progress::Never) : std::nullopt;
 }
 
 /// What is wrong with a line that has something too much.
@@ -138,6 +160,22 @@ void CommandLine::declareSettings()
             "--lang", [this](const std::string &locale) { settings_.locale = locale; },
             "Give error messages in the language of this locale, e.g. de")
         ->type_name("LOCALE");
+    line_
+        ->add_option_function<std::string>(
+            "--progress",
+            [this](const std::string &text)
+            {
+                const std::optional<Progress> progress = parseProgress(text);
+                if (!progress)
+                {
+                    throw CLI::ValidationError("--progress",
+                                               "\"" + text + "\" is not auto, always or never");
+                }
+                settings_.progress = *progress;
+            },
+            "Draw the progress of long operations on standard error: always,\nnever, or auto "
+            "(if that is a terminal)")
+        ->type_name("WHEN");
 }
 
 void CommandLine::declareCommands()

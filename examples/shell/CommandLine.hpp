@@ -14,6 +14,15 @@ namespace vclink::shell
 
 class Output;
 
+/// Whether progress is drawn.
+enum class Progress
+{
+    /// if standard error is a terminal that can show it
+    WhereSeen,
+    Always,
+    Never
+};
+
 /// What the person set before the command.
 struct Settings
 {
@@ -21,6 +30,7 @@ struct Settings
     std::vector<std::string> folders;
     std::optional<unsigned> severities;
     std::optional<std::string> locale;
+    Progress progress = Progress::WhereSeen;
 };
 
 /// Reads the arguments of the program.

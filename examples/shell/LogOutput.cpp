@@ -13,6 +13,7 @@
 #include <boost/log/sinks/text_ostream_backend.hpp>
 #include <boost/make_shared.hpp>
 
+#include "ProgressLine.hpp"
 #include "fl/i18n/convert.hpp"
 #include "names.hpp"
 #include "severities.hpp"
@@ -35,14 +36,20 @@ void formatRecord(const boost::log::record_view &record, boost::log::formatting_
     stream << '[' << severityName(severity) << "] " << text;
 }
 
-boost::shared_ptr<Sink> makeSink()
+boost::shared_ptr<Sink> makeSink(ProgressLine &progressLine)
 {
     const auto backend = boost::make_shared<boost::log::sinks::text_ostream_backend>();
     backend->add_stream(boost::shared_ptr<std::ostream>(&std::cerr, boost::null_deleter()));
     backend->auto_flush(true);
     auto sink = boost::make_shared<Sink>(backend);
     sink->set_filter(boost::log::expressions::attr<std::string>("Channel") == libraryLogger);
-    sink->set_formatter(&formatRecord);
+    sink->set_formatter(
+        [&progressLine](const boost::log::record_view &record,
+                        boost::log::formatting_ostream &stream)
+        {
+            progressLine.clear();
+            formatRecord(record, stream);
+        });
     return sink;
 }
 
@@ -50,10 +57,11 @@ boost::shared_ptr<Sink> makeSink()
 
 struct LogOutput::Impl
 {
-    boost::shared_ptr<Sink> sink = makeSink();
+    boost::shared_ptr<Sink> sink;
 };
 
-LogOutput::LogOutput(unsigned severities) : impl_(std::make_unique<Impl>())
+LogOutput::LogOutput(unsigned severities, ProgressLine &progressLine)
+    : impl_(std::make_unique<Impl>(Impl{makeSink(progressLine)}))
 {
     boost::log::core::get()->add_sink(impl_->sink);
     vclink_host::setEnabledSeverities(libraryLogger, severities);

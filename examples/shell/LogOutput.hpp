@@ -6,6 +6,8 @@
 namespace vclink::shell
 {
 
+class ProgressLine;
+
 /// Shows the library's log records on standard error while it lives: one line a record, its
 /// severity in brackets before its text. Lines that a record brings itself are indented, so that
 /// only records begin with a bracket.
@@ -13,7 +15,8 @@ class LogOutput
 {
   public:
     /// @param severities what is to be shown
-    explicit LogOutput(unsigned severities);
+    /// @param progressLine is taken away before a record; outlives the output
+    LogOutput(unsigned severities, ProgressLine &progressLine);
     LogOutput(const LogOutput &) = delete;
     LogOutput &operator=(const LogOutput &) = delete;
     ~LogOutput();

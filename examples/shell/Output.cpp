@@ -3,6 +3,7 @@
 
 #include <cerrno>
 #include <cstdlib>
+#include <iostream>
 #include <system_error>
 #include <utility>
 
@@ -10,6 +11,8 @@
 #include <unistd.h>
 
 #include "failures.hpp"
+#include "fl/i18n/convert.hpp"
+#include "names.hpp"
 
 namespace vclink::shell
 {
@@ -18,12 +21,17 @@ namespace
 
 constexpr std::size_t pieceSize = std::size_t{64} * 1024;
 
+bool terminalHasControls()
+{
+    const char *terminal = std::getenv("TERM");
+    return terminal != nullptr && std::string_view(terminal) != "dumb";
+}
+
 bool personWantsColour()
 {
     const char *refusal = std::getenv("NO_COLOR");
-    const char *terminal = std::getenv("TERM");
     const bool refused = refusal != nullptr && *refusal != '\0';
-    return !refused && terminal != nullptr && std::string_view(terminal) != "dumb";
+    return !refused && terminalHasControls();
 }
 
 } // namespace
@@ -67,6 +75,19 @@ bool Output::hasColour() const noexcept
 bool errorsAreOnTerminal() noexcept
 {
     return ::isatty(STDERR_FILENO) == 1;
+}
+
+bool errorsCanBeRedrawn() noexcept
+{
+    return errorsAreOnTerminal() && terminalHasControls();
+}
+
+void remark(const std::string &text)
+{
+    if (errorsAreOnTerminal())
+    {
+        std::cerr << makePrintable(fl::i18n::utf8_to_ustring(text)) + '\n';
+    }
 }
 
 void holdStandardDescriptors()

@@ -32,6 +32,13 @@ class Output
 /// Whether a person sees what is written to standard error.
 bool errorsAreOnTerminal() noexcept;
 
+/// Whether the person at that terminal can be shown a line that is drawn again and again.
+bool errorsCanBeRedrawn() noexcept;
+
+/// Tells what was done, in a line on standard error, to a person who sees it: nothing is written
+/// where that is no terminal.
+void remark(const std::string &text);
+
 /// Makes sure that standard input, output and error are taken, so that no file that is opened later
 /// gets one of their numbers and what is meant for it. Where one was closed, using it still fails.
 void holdStandardDescriptors();

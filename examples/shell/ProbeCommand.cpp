@@ -1,5 +1,4 @@
 // SPDX-License-Identifier: MIT
-#include <iostream>
 #include <string>
 
 #include "Output.hpp"
@@ -29,10 +28,10 @@ class ProbeCommand : public Command
         const bool served = session.factory().isAdapterFor(makePath(resolveArgument(folder_)));
         session.output().write(served ? "yes\n" : "no\n");
         session.output().flush();
-        if (served && errorsAreOnTerminal())
+        if (served)
         {
-            std::cerr << "served by the back end \""
-                      << fl::i18n::ustring_to_utf8(session.factory().getName()) << "\"\n";
+            remark("served by the back end \"" +
+                   fl::i18n::ustring_to_utf8(session.factory().getName()) + '"');
         }
         return served ? Done : Failed;
     }

@@ -7,7 +7,6 @@
 
 #include "failures.hpp"
 #include "names.hpp"
-#include "vclink/git/LibGit2Guard.hpp"
 
 namespace vclink::shell
 {
@@ -54,7 +53,9 @@ upath findRoot(const CMAdapterFactory &factory)
 
 } // namespace
 
-Session::Session(Output &output) : output_(output), interactor_(std::make_shared<ShellInteractor>())
+Session::Session(Output &output, ProgressLine &progressLine)
+    : output_(output), progressLine_(progressLine),
+      interactor_(std::make_shared<ShellInteractor>(progressLine))
 {
 }
 
@@ -63,6 +64,11 @@ Session::~Session() = default;
 Output &Session::output() noexcept
 {
     return output_;
+}
+
+ProgressLine &Session::progressLine() noexcept
+{
+    return progressLine_;
 }
 
 const CMAdapterFactory &Session::factory() const noexcept
@@ -79,9 +85,13 @@ CMAdapter &Session::adapter()
 {
     if (adapter_ == nullptr)
     {
-        // Held until the adapter has a guard of its own, so that libgit2 starts only once.
-        const git::LibGit2Guard guard;
-        adapter_ = factory_.createAdapterFor(findRoot(factory_), interactor_);
+        {
+            // Held until the adapter has a guard of its own, so that libgit2 starts only once.
+            const git::LibGit2Guard guard;
+            adapter_ = factory_.createAdapterFor(findRoot(factory_), interactor_);
+        }
+        // Each guard that has ended, those of the search too, took the merge drivers away.
+        guard_.emplace();
     }
     return *adapter_;
 }

@@ -2,28 +2,33 @@
 #pragma once
 
 #include <memory>
+#include <optional>
 
 #include "ShellInteractor.hpp"
 #include "fl/filesystem/path.hpp"
 #include "vclink/CMAdapter.hpp"
 #include "vclink/git/GitAdapterFactory.hpp"
+#include "vclink/git/LibGit2Guard.hpp"
 
 namespace vclink::shell
 {
 
 class Output;
+class ProgressLine;
 
-/// What a command works with: the back end, the person at the terminal, and standard output.
+/// What a command works with: the back end, the person at the terminal, standard output, and the
+/// line for progress.
 class Session
 {
   public:
-    /// @param output must outlive the session
-    explicit Session(Output &output);
+    /// @param output, progressLine must outlive the session
+    Session(Output &output, ProgressLine &progressLine);
     Session(const Session &) = delete;
     Session &operator=(const Session &) = delete;
     ~Session();
 
     Output &output() noexcept;
+    ProgressLine &progressLine() noexcept;
     const CMAdapterFactory &factory() const noexcept;
     const std::shared_ptr<ShellInteractor> &interactor() const noexcept;
 
@@ -33,9 +38,11 @@ class Session
 
   private:
     Output &output_;
+    ProgressLine &progressLine_;
     git::GitAdapterFactory factory_;
     std::shared_ptr<ShellInteractor> interactor_;
     std::unique_ptr<CMAdapter> adapter_;
+    std::optional<git::LibGit2Guard> guard_;
 };
 
 } // namespace vclink::shell

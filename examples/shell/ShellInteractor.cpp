@@ -4,11 +4,7 @@
 namespace vclink::shell
 {
 
-void SilentProgressReporter::setProgress(double /*fraction*/)
-{
-}
-
-void SilentProgressReporter::setProgressMessage(const ustring & /*message*/)
+ShellInteractor::ShellInteractor(ProgressLine &line) : progress_(line, activity_)
 {
 }
 
@@ -20,6 +16,11 @@ Terminator &ShellInteractor::getTerminator()
 ProgressReporter *ShellInteractor::getProgressReporter()
 {
     return &progress_;
+}
+
+Activity &ShellInteractor::activity() noexcept
+{
+    return activity_;
 }
 
 } // namespace vclink::shell

@@ -1,32 +1,31 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
-#include "fl/ustring.hpp"
+#include "Activity.hpp"
+#include "TerminalProgressReporter.hpp"
 #include "vclink/ApplicationInteractor.hpp"
-#include "vclink/ProgressReporter.hpp"
 #include "vclink/Terminator.hpp"
 
 namespace vclink::shell
 {
 
-/// Shows no progress.
-class SilentProgressReporter : public ProgressReporter
-{
-  public:
-    void setProgress(double fraction) override;
-    void setProgressMessage(const ustring &message) override;
-};
-
 /// The person at the terminal, as the back end sees them.
 class ShellInteractor : public ApplicationInteractor
 {
   public:
+    /// @param line where progress is shown; outlives the interactor
+    explicit ShellInteractor(ProgressLine &line);
+
     Terminator &getTerminator() override;
     ProgressReporter *getProgressReporter() override;
 
+    /// When the back end last reported anything.
+    Activity &activity() noexcept;
+
   private:
     Terminator terminator_;
-    SilentProgressReporter progress_;
+    Activity activity_;
+    TerminalProgressReporter progress_;
 };
 
 } // namespace vclink::shell

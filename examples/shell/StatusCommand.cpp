@@ -1,14 +1,12 @@
 // SPDX-License-Identifier: MIT
-#include <filesystem>
-#include <iostream>
 #include <string>
-#include <system_error>
 #include <vector>
 
 #include "Output.hpp"
 #include "Session.hpp"
 #include "commands.hpp"
 #include "fl/i18n/convert.hpp"
+#include "namedPaths.hpp"
 #include "names.hpp"
 #include "pathArguments.hpp"
 #include "states.hpp"
@@ -38,21 +36,13 @@ FileStateMap collectStates(CMAdapter &adapter, const std::vector<std::string> &a
 {
     FileStateMap states;
     std::vector<upath> files;
-    for (const std::string &argument : arguments)
+    for (NamedPath &named : lookUpFolders(adapter, arguments))
     {
-        const std::filesystem::path path = resolveArgument(argument);
-        std::error_code ignored;
-        FileStateMap below;
-        if (std::filesystem::is_directory(path, ignored))
+        if (named.states.empty())
         {
-            below = adapter.getFolderStates(makePath(path));
+            files.push_back(named.path);
         }
-        // A folder without files of its own may be a submodule, which is a single entry.
-        if (below.empty())
-        {
-            files.push_back(makePath(path));
-        }
-        states.merge(below);
+        states.merge(named.states);
     }
     FileStateMap single = adapter.getFileStates(files);
     states.merge(single);
@@ -81,10 +71,7 @@ class StatusCommand : public Command
             writeRecord(session.output(), wordsFor(state), relativeName(path, root));
         }
         session.output().flush();
-        if (errorsAreOnTerminal())
-        {
-            std::cerr << countStates(states) << '\n';
-        }
+        remark(countStates(states));
         return Done;
     }
 

@@ -10,6 +10,21 @@ const std::vector<CommandEntry> &commandTable()
 {
     static const std::vector<CommandEntry> table{
         {"status", "Show the state of files", makeStatusCommand},
+        {"add", "Let new files be in the next commit", makeAddCommand},
+        {"rm", "Let files be gone in the next commit; they stay on the disk", makeRemoveCommand},
+        {"resolved", "Mark a file in conflict as resolved", makeResolvedCommand},
+        {"commit", "Commit all changes to tracked files", makeCommitCommand},
+        {"revert", "Throw away all changes to files", makeRevertCommand},
+        {"branches", "Show the names of branches", makeBranchesCommand},
+        {"branch", "Make or delete a branch", makeBranchCommand},
+        {"switch", "Make another branch the current one", makeSwitchCommand},
+        {"current", "Show the name of the current branch", makeCurrentCommand},
+        {"rev", "Show the id of a revision", makeRevisionCommand},
+        {"state", "Tell whether a merge or another operation is unfinished", makeStateCommand},
+        {"merge", "Merge a branch into the current one", makeMergeCommand},
+        {"attr", "Show Git's attributes of a file", makeAttributesCommand},
+        {"config", "Show or install the merge and diff tools in Git's configuration",
+         makeConfigCommand},
         {"probe", "Tell whether a folder is a working copy or repository that can be served",
          makeProbeCommand},
         {"version", "Show the versions of this program and of libgit2", makeVersionCommand}};

@@ -4,6 +4,7 @@
 #include <exception>
 #include <iostream>
 
+#include "fl/i18n/VkLocale.hpp"
 #include "fl/i18n/convert.hpp"
 #include "foundation/core/except/IUserException.hpp"
 #include "names.hpp"
@@ -11,6 +12,26 @@
 
 namespace vclink::shell
 {
+namespace
+{
+
+/// Cancellation has no text in the back end's catalogue: what to call it is the host's affair.
+std::string cancelledText()
+{
+    const std::string locale = fl::i18n::VkLocale::global().name();
+    const std::string language = locale.substr(0, locale.find_first_of("_.@"));
+    if (language == "de")
+    {
+        return "Der Vorgang wurde abgebrochen.";
+    }
+    if (language == "ja")
+    {
+        return "操作はキャンセルされました。";
+    }
+    return "The operation was cancelled.";
+}
+
+} // namespace
 
 void complain(const std::string &text)
 {
@@ -23,9 +44,9 @@ ExitStatus reportFailure()
     {
         throw;
     }
-    catch (const util::exception::CancelledOperationException &cancelled)
+    catch (const util::exception::CancelledOperationException &)
     {
-        complain(cancelled.what());
+        complain(cancelledText());
         return Cancelled;
     }
     catch (const foundation::core::except::IUserException &failure)

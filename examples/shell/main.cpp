@@ -7,6 +7,7 @@
 #include "CommandLine.hpp"
 #include "LogOutput.hpp"
 #include "Output.hpp"
+#include "ProgressLine.hpp"
 #include "Session.hpp"
 #include "failures.hpp"
 #include "fl/i18n/VkLocale.hpp"
@@ -27,6 +28,12 @@ void enterFolder(const std::string &folder)
     }
 }
 
+bool isProgressShown(Progress progress)
+{
+    return progress == Progress::Always ||
+           (progress == Progress::WhereSeen && errorsCanBeRedrawn());
+}
+
 ExitStatus runCommand(const Settings &settings, Command &command, Output &output)
 {
     for (const std::string &folder : settings.folders)
@@ -41,12 +48,13 @@ ExitStatus runCommand(const Settings &settings, Command &command, Output &output
     {
         vclink_host::setGlobalLocale(fl::i18n::VkLocale(*settings.locale));
     }
+    ProgressLine progressLine(isProgressShown(settings.progress));
     std::optional<LogOutput> log;
     if (settings.severities)
     {
-        log.emplace(*settings.severities);
+        log.emplace(*settings.severities, progressLine);
     }
-    Session session(output);
+    Session session(output, progressLine);
     const ExitStatus status = command.run(session);
     output.flush();
     return status;

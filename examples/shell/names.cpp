@@ -114,6 +114,11 @@ upath makePath(const std::filesystem::path &path)
     return upath(fl::i18n::utf8_to_ustring(path.string()));
 }
 
+std::filesystem::path nativePath(const upath &path)
+{
+    return fl::i18n::ustring_to_utf8(path.string());
+}
+
 ustring relativeName(const upath &path, const upath &root)
 {
     const ustring &text = path.string();
@@ -135,6 +140,11 @@ std::string quoteName(const ustring &name)
 std::string makePrintable(const ustring &text)
 {
     return fl::i18n::ustring_to_utf8(escape(text, u"\n\t", u""));
+}
+
+std::string makePrintableLine(const ustring &text)
+{
+    return fl::i18n::ustring_to_utf8(escape(text, u"", u""));
 }
 
 } // namespace vclink::shell

@@ -21,6 +21,9 @@ std::filesystem::path resolveArgument(const std::string &argument);
 /// A path as the host's value. Its bytes stay as they are.
 upath makePath(const std::filesystem::path &path);
 
+/// A path of the host's as the system's.
+std::filesystem::path nativePath(const upath &path);
+
 /// The path from `root` to `path`, which lies below it.
 ustring relativeName(const upath &path, const upath &root);
 
@@ -32,5 +35,8 @@ std::string quoteName(const ustring &name);
 /// A text with what could do something to the terminal escaped as in quoteName(), line feeds and
 /// tabs left as they are.
 std::string makePrintable(const ustring &text);
+
+/// As makePrintable(), with line feeds and tabs escaped too.
+std::string makePrintableLine(const ustring &text);
 
 } // namespace vclink::shell

@@ -25,9 +25,29 @@ const StateWords &wordsFor(FileState state)
     return found == stateWords.end() ? stateWords.back() : *found;
 }
 
+bool isTracked(FileState::State state)
+{
+    return state != FileState::Unversioned;
+}
+
+bool isChanged(FileState::State state)
+{
+    return isTracked(state) && state != FileState::Clean;
+}
+
+bool isInConflict(FileState::State state)
+{
+    return state == FileState::InConflict;
+}
+
+std::string countFiles(std::size_t count)
+{
+    return std::to_string(count) + (count == 1 ? " file" : " files");
+}
+
 std::string countStates(const FileStateMap &states)
 {
-    std::string line = std::to_string(states.size()) + (states.size() == 1 ? " file" : " files");
+    std::string line = countFiles(states.size());
     const char *separator = ": ";
     for (const StateWords &words : stateWords)
     {

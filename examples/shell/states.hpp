@@ -2,6 +2,7 @@
 #pragma once
 
 #include <array>
+#include <cstddef>
 #include <string>
 
 #include "vclink/FileState.hpp"
@@ -24,6 +25,15 @@ struct StateWords
 extern const std::array<StateWords, 8> stateWords;
 
 const StateWords &wordsFor(FileState state);
+
+/// Whether Git knows the file.
+bool isTracked(FileState::State state);
+/// Whether it does, and the file is not as in the last commit.
+bool isChanged(FileState::State state);
+bool isInConflict(FileState::State state);
+
+/// "1 file" or "2 files".
+std::string countFiles(std::size_t count);
 
 /// How many files there are of each state, in one line without its end.
 std::string countStates(const FileStateMap &states);

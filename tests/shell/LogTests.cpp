@@ -38,6 +38,7 @@ TEST_F(ShellLog, ShowsEachRecordOnALineWithItsSeverity)
     EXPECT_THAT(log, ContainsRegex("\\[scope-entry\\] .*throwIfError.*\n"
                                    "\\[diagnostic\\] Throwing error .*missing.*\n"
                                    "\\[scope-exit\\] .*throwIfError.* \\[throw\\]\n"
+                                   "(\\[diagnostic\\] Unregister merge driver: .*\n)*"
                                    "vclink-shell: "));
 }
 

@@ -42,6 +42,42 @@ TEST_F(ShellUsage, EndsWithTwoAndAReasonWhenTheArgumentsMakeNoSense)
         {{"--log", "0x", "version"}, "--log: \"0x\" is neither"},
         {{"--log", "0xFFFFFFFFF", "version"}, "--log: \"0xFFFFFFFFF\" is neither"},
         {{"--log", "-1", "version"}, "--log: \"-1\" is neither"},
+        {{"--progress"}, "--progress: 1 required WHEN missing."},
+        {{"--progress", "maybe", "version"}, "--progress: \"maybe\" is not auto, always or never."},
+        {{"--progress", "", "version"}, "--progress: \"\" is not auto"},
+        {{"add"}, "PATH is required."},
+        {{"rm"}, "PATH is required."},
+        {{"revert"}, "PATH is required."},
+        {{"resolved"}, "PATH is required."},
+        {{"resolved", "a", "b"}, "PATH: At Most 1 required but received 2."},
+        {{"add", "a", ""}, "PATH: it may not be empty."},
+        {{"commit"}, "-m is required."},
+        {{"commit", "-m"}, "-m: 1 required MESSAGE missing."},
+        {{"commit", "-m", "a", "-m", "b"}, "-m: At Most 1 required but received 2."},
+        {{"commit", "-m", "a", "b"}, "\"b\" was not expected."},
+        {{"commit", "--as-is"}, "-m is required."},
+        {{"branches", "main"}, "\"main\" was not expected."},
+        {{"branch"}, "NAME is required."},
+        {{"branch", "a"}, "START is required."},
+        {{"branch", "a", ""}, "START: it may not be empty."},
+        {{"branch", "a", "b", "c"}, "\"c\" was not expected."},
+        {{"branch", "-d"}, "NAME is required."},
+        {{"branch", "-d", ""}, "NAME: it may not be empty."},
+        {{"branch", "-d", "a", "b"}, "START: it is not for a branch to delete."},
+        {{"switch"}, "NAME is required."},
+        {{"switch", "a", "b"}, "\"b\" was not expected."},
+        {{"current", "a"}, "\"a\" was not expected."},
+        {{"rev"}, "NAME is required."},
+        {{"rev", ""}, "NAME: it may not be empty."},
+        {{"state", "a"}, "\"a\" was not expected."},
+        {{"merge"}, "NAME is required."},
+        {{"merge", ""}, "NAME: it may not be empty."},
+        {{"merge", "a", "b"}, "\"b\" was not expected."},
+        {{"merge", "--force"}, "NAME is required."},
+        {{"attr"}, "PATH is required."},
+        {{"attr", "a"}, "NAME is required."},
+        {{"attr", "a", "b", ""}, "NAME: it may not be empty."},
+        {{"config", "a"}, "\"a\" was not expected."},
     };
     for (const auto &[arguments, reason] : cases)
     {
@@ -60,15 +96,37 @@ TEST_F(ShellUsage, ExplainsItselfOnStandardOutput)
         const CommandResult result = shell({option}).run();
         EXPECT_EQ(result.exitStatus, 0);
         EXPECT_EQ(result.errors, "");
-        for (const std::string word : {"status", "probe", "version", "-C FOLDER",
-                                       "--log SEVERITIES", "--lang LOCALE", "Exit status: 0 done"})
+        for (const std::string word : {"status",
+                                       "add",
+                                       "rm",
+                                       "resolved",
+                                       "commit",
+                                       "revert",
+                                       "branches",
+                                       "branch",
+                                       "switch",
+                                       "current",
+                                       "rev",
+                                       "state",
+                                       "merge",
+                                       "attr",
+                                       "config",
+                                       "probe",
+                                       "version",
+                                       "-C FOLDER",
+                                       "--log SEVERITIES",
+                                       "--lang LOCALE",
+                                       "--progress WHEN",
+                                       "Exit status: 0 done"})
             EXPECT_THAT(result.output, HasSubstr(word));
     }
 }
 
 TEST_F(ShellUsage, ExplainsEveryCommandOnStandardOutput)
 {
-    for (const std::string command : {"status", "probe", "version"})
+    for (const std::string command :
+         {"status", "add", "rm", "resolved", "commit", "revert", "branches", "branch", "switch",
+          "current", "rev", "state", "merge", "attr", "config", "probe", "version"})
     {
         const CommandResult result = shell({command, "--help"}).run();
         EXPECT_EQ(result.exitStatus, 0);

@@ -4,10 +4,12 @@
 #include <gtest/gtest.h>
 
 #include "examples/shell/failures.hpp"
+#include "fl/i18n/VkLocale.hpp"
 #include "fl/i18n/convert.hpp"
 #include "vclink/git/GitException.hpp"
 #include "vclink/git/messageIdentifiers.hpp"
 #include "vclink/util/exception/CancelledOperationException.hpp"
+#include "vclink_host/locale.hpp"
 
 namespace vclink::test
 {
@@ -40,6 +42,28 @@ TEST(ReportFailure, EndsWith130WhenThePersonCancelled)
     const Report told = report(util::exception::CancelledOperationException());
     EXPECT_EQ(told.status, 130);
     EXPECT_EQ(told.errors, "vclink-shell: The operation was cancelled.\n");
+}
+
+TEST(ReportFailure, NamesTheCancellationInTheLanguageOfTheLocale)
+{
+    const struct
+    {
+        std::string locale;
+        std::string text;
+    } cases[] = {{"de_AT.UTF-8", "Der Vorgang wurde abgebrochen.\n"},
+                 {"de", "Der Vorgang wurde abgebrochen.\n"},
+                 {"ja_JP", "操作はキャンセルされました。\n"},
+                 {"den", "The operation was cancelled.\n"},
+                 {"C", "The operation was cancelled.\n"}};
+    const fl::i18n::VkLocale before = fl::i18n::VkLocale::global();
+    for (const auto &[locale, text] : cases)
+    {
+        vclink_host::setGlobalLocale(fl::i18n::VkLocale(locale));
+        const Report told = report(util::exception::CancelledOperationException());
+        EXPECT_EQ(told.status, 130);
+        EXPECT_EQ(told.errors, "vclink-shell: " + text);
+    }
+    vclink_host::setGlobalLocale(before);
 }
 
 TEST(ReportFailure, TellsTheLocalizedTextWithTheAddedOne)

@@ -1,0 +1,89 @@
+// SPDX-License-Identifier: MIT
+#include <string>
+#include <vector>
+
+#include <CLI/CLI.hpp>
+
+#include "Output.hpp"
+#include "Session.hpp"
+#include "commands.hpp"
+#include "failures.hpp"
+#include "fl/i18n/convert.hpp"
+#include "namedPaths.hpp"
+#include "names.hpp"
+#include "refusals.hpp"
+#include "states.hpp"
+
+namespace vclink::shell
+{
+namespace
+{
+
+/// @throws ShellFailure when there are any
+void refuseConflicts(const FileStateMap &states, const upath &root)
+{
+    std::string names;
+    for (const auto &[path, state] : filter(states, isInConflict))
+    {
+        names += "\n  " + quoteName(relativeName(path, root));
+    }
+    if (!names.empty())
+    {
+        throw ShellFailure(
+            "Nothing was committed, because these files are in conflict:" + names +
+            "\nMake each as it should be, and mark it with \"vclink-shell resolved\". "
+            "With --as-is the commit\ntakes them as they stand, with any conflict "
+            "markers.");
+    }
+}
+
+class CommitCommand : public Command
+{
+  public:
+    void declare(CLI::App &line) override
+    {
+        message_ = line.add_option_function<std::string>(
+                           "-m", [](const std::string & /*message*/) {},
+                           "What the commit says, as it stands")
+                       ->type_name("MESSAGE")
+                       ->option_text("MESSAGE")
+                       ->required();
+        line.add_flag("--as-is", takesConflicts_,
+                      "Commit files in conflict as they stand, markers included");
+        line.footer(
+            "All changes to tracked files are in the commit, staged or not, and what was added "
+            "or removed.\nA merge that is under way is ended by it. The identity is that of "
+            "git's settings user.name and\nuser.email; where they are not set, it is made "
+            "from USER or LOGNAME and the name of the host.");
+    }
+
+    ExitStatus run(Session &session) override
+    {
+        CMAdapter &adapter = session.adapter();
+        const upath &root = adapter.getRootFolder();
+        const FileStateMap states = adapter.getFolderStates(root);
+        if (!takesConflicts_)
+        {
+            refuseConflicts(states, root);
+        }
+        adapter.commit(root, fl::i18n::utf8_to_ustring(message_->results().front()));
+        // What a sparse checkout leaves out is missing before and after.
+        const FileStateMap changed = filter(states, isChanged);
+        const std::size_t left = findLeftOut(adapter, changed, isChanged).size();
+        remark("Committed " + countFiles(changed.size() - left) + '.');
+        return Done;
+    }
+
+  private:
+    const CLI::Option *message_ = nullptr;
+    bool takesConflicts_ = false;
+};
+
+} // namespace
+
+std::unique_ptr<Command> makeCommitCommand()
+{
+    return std::make_unique<CommitCommand>();
+}
+
+} // namespace vclink::shell

@@ -1,0 +1,80 @@
+// SPDX-License-Identifier: MIT
+#include <optional>
+#include <string>
+#include <utility>
+
+#include <CLI/CLI.hpp>
+
+#include "Output.hpp"
+#include "Session.hpp"
+#include "commands.hpp"
+#include "fl/i18n/convert.hpp"
+#include "names.hpp"
+#include "vclink/git/GitConfig.hpp"
+
+namespace vclink::shell
+{
+namespace
+{
+
+class ConfigCommand : public Command
+{
+  public:
+    void declare(CLI::App &line) override
+    {
+        line.add_flag("--write", writes_,
+                      "Install the tools that come along, over what stands there");
+        line.footer(
+            "Shows the merge and diff tools in Git's configuration of this user. One line for each "
+            "that is set:\nits key, a tab, and its value. A file is merged by the automatic "
+            "tool when the attribute \"merge\"\ngives it \"vkAutoMerge\"; git mergetool and "
+            "git difftool run the others when they are told\n\"--tool=vkMerge\" and "
+            "\"--tool=vkDiff\". The file goes to standard error, if that is a terminal.");
+    }
+
+    ExitStatus run(Session &session) override
+    {
+        git::GitConfig config;
+        if (writes_)
+        {
+            config.writeAutoMergeDriver();
+            config.writeMergeTool();
+            config.writeDiffTool();
+        }
+        else
+        {
+            show(config, session.output());
+        }
+        const std::optional<upath> file = config.globalFilePath();
+        remark(file ? "Git's configuration of this user: " + nativePath(*file).string()
+                    : "There is no .gitconfig in the home folder.");
+        return Done;
+    }
+
+  private:
+    static void show(const git::GitConfig &config, Output &output)
+    {
+        for (const auto &[key, value] :
+             {std::pair("merge.vkAutoMerge.driver", config.readAutoMergeDriver()),
+              std::pair("mergetool.vkMerge.cmd", config.readMergeTool()),
+              std::pair("difftool.vkDiff.cmd", config.readDiffTool())})
+        {
+            if (value)
+            {
+                output.write(std::string(key) + '\t' + makePrintableLine(*value) + '\n');
+            }
+        }
+        output.flush();
+    }
+
+    bool writes_ = false;
+};
+
+} // namespace
+
+std::unique_ptr<Command> makeConfigCommand()
+{
+    return std::make_unique<ConfigCommand>();
+}
+
+} // namespace vclink::shell

@@ -1,0 +1,35 @@
+// SPDX-License-Identifier: MIT
+#include "TerminalProgressReporter.hpp"
+
+namespace vclink::shell
+{
+namespace
+{
+
+constexpr std::chrono::milliseconds drawingPause{50};
+
+} // namespace
+
+TerminalProgressReporter::TerminalProgressReporter(ProgressLine &line, Activity &activity)
+    : line_(line), activity_(activity)
+{
+}
+
+void TerminalProgressReporter::setProgress(double fraction)
+{
+    activity_.note();
+    fraction_ = fraction;
+}
+
+void TerminalProgressReporter::setProgressMessage(const ustring &message)
+{
+    activity_.note();
+    const auto now = std::chrono::steady_clock::now();
+    if (line_.isShown() && now >= nextDrawing_)
+    {
+        nextDrawing_ = now + drawingPause;
+        line_.draw(fraction_, message);
+    }
+}
+
+} // namespace vclink::shell

@@ -1,0 +1,180 @@
+// SPDX-License-Identifier: MIT
+#include "namedPaths.hpp"
+
+#include <algorithm>
+#include <system_error>
+#include <utility>
+
+#include "links.hpp"
+#include "names.hpp"
+
+namespace vclink::shell
+{
+namespace
+{
+
+namespace fs = std::filesystem;
+
+bool isBelow(const ustring &path, const ustring &folder)
+{
+    return path.size() > folder.size() && path[folder.size()] == u'/' &&
+           path.compare(0, folder.size(), folder) == 0;
+}
+
+/// The states of a path and of what lies below it.
+FileStateMap pick(const FileStateMap &states, const upath &path)
+{
+    FileStateMap picked;
+    for (auto entry = states.lower_bound(path); entry != states.end(); ++entry)
+    {
+        const ustring &name = entry->first.string();
+        if (!liesIn(name, path.string()))
+        {
+            break;
+        }
+        picked.insert(picked.end(), *entry);
+    }
+    return picked;
+}
+
+/// Completes what was named by the states of its own entry, which a folder has too where it stands
+/// in the place of a file, and by those below a folder that is gone.
+void lookUpEntry(CMAdapter &adapter, const FileStateMap &states, NamedPath &named)
+{
+    const upath &path = named.path;
+    if (!liesIn(path.string(), adapter.getRootFolder().string()))
+    {
+        named.states.clear();
+        return;
+    }
+    named.states = pick(named.states, path);
+    if (!named.states.empty() && states.count(path) == 0)
+    {
+        return;
+    }
+    named.states = pick(states, path);
+    if (named.states.empty())
+    {
+        // Of a renamed file that was asked for together with its old name, only that is told.
+        named.states = pick(adapter.getFileStates({named.path}), path);
+    }
+    named.isFolder = !named.states.empty() &&
+                     isBelow(named.states.begin()->first.string(), path.string()) &&
+                     named.states.begin()->first.string() != path.string() + u'/';
+}
+
+NamedPath lookUpFolder(CMAdapter &adapter, const std::string &argument, const fs::path &path)
+{
+    NamedPath named{argument, makePath(path), {}, false, false};
+    std::error_code ignored;
+    if (fs::is_directory(path, ignored))
+    {
+        named.states = adapter.getFolderStates(named.path);
+        named.isFolder = !named.states.empty();
+    }
+    return named;
+}
+
+/// As Git knows what stands there, and what lay below it before it became a link.
+NamedPath lookUpLink(CMAdapter &adapter, const std::string &argument, const upath &entry)
+{
+    FileStateMap states = pick(adapter.getFolderStates(adapter.getRootFolder()), entry);
+    const bool isFolder = !states.empty() && states.rbegin()->first.string() != entry.string();
+    return {argument, entry, std::move(states), isFolder, true};
+}
+
+} // namespace
+
+std::vector<NamedPath> lookUpFolders(CMAdapter &adapter, const std::vector<std::string> &arguments)
+{
+    std::vector<NamedPath> paths;
+    for (const std::string &argument : arguments)
+    {
+        paths.push_back(lookUpFolder(adapter, argument, resolveArgument(argument)));
+    }
+    return paths;
+}
+
+std::vector<NamedPath> lookUp(CMAdapter &adapter, const std::vector<std::string> &arguments)
+{
+    const upath &root = adapter.getRootFolder();
+    std::vector<NamedPath> paths;
+    std::vector<upath> entries;
+    for (const std::string &argument : arguments)
+    {
+        const upath entry = entryForm(resolveArgument(argument), root);
+        const bool isLink = liesIn(entry.string(), root.string()) && isFollowed(entry, root);
+        if (!isLink)
+        {
+            entries.push_back(entry);
+        }
+        paths.push_back(isLink ? lookUpLink(adapter, argument, entry)
+                               : lookUpFolder(adapter, argument, nativePath(entry)));
+    }
+    const FileStateMap states = adapter.getFileStates(entries);
+    for (NamedPath &named : paths)
+    {
+        if (!named.isLink)
+        {
+            lookUpEntry(adapter, states, named);
+        }
+    }
+    return paths;
+}
+
+bool liesIn(const ustring &path, const ustring &folder)
+{
+    return path == folder || isBelow(path, folder);
+}
+
+bool isAddressable(const upath &path, const upath &root)
+{
+    return relativeName(path, root).find(u'\\') == ustring::npos;
+}
+
+bool meansAllBelow(const ustring &name)
+{
+    constexpr std::u16string_view special = u"*?[\\";
+    const bool isOdd = name.empty() || name.front() == u'#' || name.front() == u'!';
+    return !isOdd &&
+           std::none_of(name.begin(), name.end(),
+                        [special](char16_t unit) {
+                            return (unit < 0x20) || special.find(unit) != std::u16string_view::npos;
+                        }) &&
+           name.back() != u' ';
+}
+
+upath canonicalForm(const upath &path)
+{
+    return makePath(fs::weakly_canonical(nativePath(path)));
+}
+
+FileStateMap filter(const FileStateMap &states,
+                    const std::function<bool(FileState::State)> &isMeant)
+{
+    FileStateMap meant;
+    for (const auto &entry : states)
+    {
+        if (isMeant(entry.second.getState()))
+        {
+            meant.insert(meant.end(), entry);
+        }
+    }
+    return meant;
+}
+
+std::vector<upath> addressable(const FileStateMap &states, const upath &root)
+{
+    std::vector<upath> paths;
+    paths.reserve(states.size());
+    for (const auto &[path, state] : states)
+    {
+        if (isAddressable(path, root))
+        {
+            paths.push_back(path);
+        }
+    }
+    return paths;
+}
+
+} // namespace vclink::shell

@@ -1,0 +1,61 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <filesystem>
+#include <functional>
+#include <string>
+#include <vector>
+
+#include "vclink/CMAdapter.hpp"
+#include "vclink/FileStateMap.hpp"
+
+namespace vclink::shell
+{
+
+/// Something that the person named on the command line.
+struct NamedPath
+{
+    /// as it was given
+    std::string argument;
+    /// absolute
+    upath path;
+    /// Of a folder, all files below it; of a file, the file itself; nothing that Git does not know.
+    FileStateMap states;
+    /// whether the states are those of files below a folder
+    bool isFolder = false;
+    /// whether the back end would follow a symbolic link, see isFollowed()
+    bool isLink = false;
+};
+
+/// What was named, with the states of all files below the folders. A folder is asked for by itself.
+/// One without files of its own may be a submodule, which is a single entry, and counts as a file.
+/// @throws ShellFailure, and what the back end raises
+std::vector<NamedPath> lookUpFolders(CMAdapter &adapter, const std::vector<std::string> &arguments);
+
+/// As lookUpFolders(), with the states of the files too, and with paths as Git has them: a symbolic
+/// link is the entry of that name, not what it leads to. The pattern that a name may be to Git
+/// gives no file of another name.
+std::vector<NamedPath> lookUp(CMAdapter &adapter, const std::vector<std::string> &arguments);
+
+/// Whether a path is that of the folder or lies below it; both free of symbolic links.
+bool liesIn(const ustring &path, const ustring &folder);
+
+/// Whether the back end can be told of a file by its name: a backslash is a slash to it.
+bool isAddressable(const upath &path, const upath &root);
+
+/// Whether a name, relative to the root, means all below it where it is a folder's. Others are
+/// patterns, or become some on their way.
+bool meansAllBelow(const ustring &name);
+
+/// Free of symbolic links, which the back end follows in every element.
+/// @throws std::filesystem::filesystem_error
+upath canonicalForm(const upath &path);
+
+/// The files whose state `isMeant` holds for.
+FileStateMap filter(const FileStateMap &states,
+                    const std::function<bool(FileState::State)> &isMeant);
+
+/// The files that the back end can be told of by their names.
+std::vector<upath> addressable(const FileStateMap &states, const upath &root);
+
+} // namespace vclink::shell

@@ -1,0 +1,132 @@
+// SPDX-License-Identifier: MIT
+#include <gmock/gmock.h>
+
+#include "ChangeTest.hpp"
+
+namespace vclink::test
+{
+namespace
+{
+
+using testing::ElementsAre;
+using testing::HasSubstr;
+using testing::IsEmpty;
+using testing::Pair;
+
+class ShellAdd : public ChangeTest
+{
+};
+
+TEST_F(ShellAdd, StagesNewFiles)
+{
+    repository_.write("new", "");
+    repository_.write("folder/newer", "");
+    repository_.write("other", "");
+    succeed({"add", "new", "folder/newer"});
+    EXPECT_THAT(letters(),
+                ElementsAre(Pair("folder/newer", "A "), Pair("new", "A "), Pair("other", "??")));
+}
+
+TEST_F(ShellAdd, StagesTheNewFilesBelowAFolderAndNothingElse)
+{
+    repository_.write("folder/new", "");
+    repository_.write("folder/deep/new", "");
+    repository_.write("folder/newer/new", "");
+    repository_.write("folder/y.ignored", "");
+    repository_.write("folder/c", "edited\n");
+    repository_.write("elsewhere", "");
+    succeed({"add", "folder/"});
+    EXPECT_THAT(letters(), ElementsAre(Pair("elsewhere", "??"), Pair("folder/c", " M"),
+                                       Pair("folder/deep/new", "A "), Pair("folder/new", "A "),
+                                       Pair("folder/newer/new", "A ")));
+}
+
+TEST_F(ShellAdd, StagesAllNewFilesForTheRootFromAnyFolder)
+{
+    repository_.write("new", "");
+    repository_.write("folder/new", "");
+    const CommandResult result = runIn(repository_ / "folder/deep", {"add", "../.."});
+    EXPECT_EQ(result.exitStatus, 0) << result.errors;
+    EXPECT_THAT(letters(), ElementsAre(Pair("folder/new", "A "), Pair("new", "A ")));
+}
+
+TEST_F(ShellAdd, IsDoneWhereAFolderHoldsNoNewFile)
+{
+    succeed({"add", "folder", "."});
+    EXPECT_THAT(letters(), IsEmpty());
+}
+
+TEST_F(ShellAdd, RefusesFilesThatGitKnowsAndAddsNothing)
+{
+    repository_.write("new", "");
+    repository_.write("b", "edited\n");
+    EXPECT_EQ(refuse({"add", "new", "b", "a"}),
+              "Nothing was added, because these files are not new to Git:\n" +
+                  (repository_ / "a").string() + "\n" + (repository_ / "b").string() + "\n");
+}
+
+TEST_F(ShellAdd, RefusesEachNameThatItCannotServeWithTheReason)
+{
+    repository_.write("new", "");
+    std::filesystem::create_directory(repository_ / "empty");
+    repository_.write("shut/y.ignored", "");
+    GitRepository(folder().path()).write("outside", "");
+    EXPECT_EQ(refuse({"add", "new", "nothing", "x.ignored", "empty", "shut", "../outside",
+                      ".git/config", "a/b"}),
+              "Nothing was added:\n"
+              "  nothing: there is no such file\n"
+              "  x.ignored: it is ignored by Git\n"
+              "  empty: there are no files in it but ignored ones\n"
+              "  shut: there are no files in it but ignored ones\n"
+              "  ../outside: it lies outside the working copy " +
+                  repository_.path().string() +
+                  "\n"
+                  "  .git/config: it is ignored by Git\n"
+                  "  a/b: there is no such file\n");
+}
+
+TEST_F(ShellAdd, DoesNotTakeANameForThePatternOfAnother)
+{
+    repository_.write("a1", "");
+    EXPECT_THAT(refuse({"add", "a[1]"}), HasSubstr("  a[1]: there is no such file\n"));
+    EXPECT_THAT(refuse({"add", "*"}), HasSubstr("  *: there is no such file\n"));
+}
+
+TEST_F(ShellAdd, SaysThatABackslashCannotBeNamed)
+{
+    repository_.write("back\\slash", "");
+    EXPECT_EQ(
+        refuse({"add", "back\\slash"}),
+        "Nothing was added:\n  \"back\\\\slash\": a backslash in a name is taken for a slash\n");
+}
+
+TEST_F(ShellAdd, StagesALinkItselfWhereItHasNoTarget)
+{
+    repository_.symlink("nowhere", "link");
+    succeed({"add", "link"});
+    EXPECT_THAT(letters(), ElementsAre(Pair("link", "A ")));
+}
+
+TEST_F(ShellAdd, RefusesANameThatMeansFilesThatWereNotNamed)
+{
+    for (const std::string name : {"a[1].txt", "a1.txt", "x[1]/y", "x1/y"})
+        repository_.write(name, "");
+    const std::string reason =
+        "Nothing was added. A name with *, ? or [ is a pattern, and means these files too:\n  ";
+    const std::string way = "\nName them as well, if they are meant.\n";
+    EXPECT_EQ(refuse({"add", "a[1].txt"}), reason + "a1.txt" + way);
+    EXPECT_THAT(refuse({"add", "x[1]"}), HasSubstr("  x[1]: *, ? and [ in a name are taken"));
+    succeed({"add", "a[1].txt", "a1.txt", "x1"});
+    EXPECT_EQ(letters().at("a[1].txt"), "A ");
+    EXPECT_EQ(letters().at("x1/y"), "A ");
+}
+
+TEST_F(ShellAdd, TellsTheLibrarysErrorWhereTheIndexIsLocked)
+{
+    repository_.write("new", "");
+    repository_.write(".git/index.lock", "");
+    EXPECT_THAT(refuse({"add", "new"}), HasSubstr("index"));
+}
+
+} // namespace
+} // namespace vclink::test

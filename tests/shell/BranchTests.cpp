@@ -1,0 +1,172 @@
+// SPDX-License-Identifier: MIT
+#include <algorithm>
+
+#include <gmock/gmock.h>
+
+#include "ShellMergeTest.hpp"
+#include "runOnTerminal.hpp"
+
+namespace vclink::test
+{
+namespace
+{
+
+using testing::ElementsAre;
+using testing::HasSubstr;
+using testing::StartsWith;
+
+const std::vector<std::string> oddNames{"{}",     "++",         "a,b",       "quo\"te",
+                                        "#hash",  "!call",      "group/one", "group/two",
+                                        "a'b$(c", "ub\xC3\xBC", "\xFF\xFE",  "%s"};
+
+class ShellBranches : public ShellMergeTest
+{
+  protected:
+    std::vector<std::string> refs(const std::string &folder) const
+    {
+        const std::string names =
+            repository_.git({"for-each-ref", "--format=%(refname:lstrip=2)", "refs/" + folder});
+        return split(names, '\n');
+    }
+    std::string idOf(const std::string &branch) const
+    {
+        return repository_.line({"rev-parse", "refs/heads/" + branch});
+    }
+    void makeOddBranches() const
+    {
+        for (const auto &name : oddNames)
+            repository_.git({"update-ref", "refs/heads/" + name, "HEAD"});
+    }
+};
+
+std::vector<std::string> sorted(std::vector<std::string> names)
+{
+    std::sort(names.begin(), names.end());
+    return names;
+}
+
+TEST_F(ShellBranches, AreListedByTheirShortNames)
+{
+    repository_.git({"branch", "topic/one"});
+    const CommandResult result = run({"branches"});
+    EXPECT_EQ(result.exitStatus, 0);
+    EXPECT_EQ(result.output, "main\ntopic/one\n");
+    EXPECT_EQ(result.errors, "");
+}
+
+TEST_F(ShellBranches, AreListedAsGitListsThemWhateverTheirNames)
+{
+    makeOddBranches();
+    const std::string output = run({"branches", "-z"}).output;
+    EXPECT_EQ(sorted(split(output, '\0')), sorted(refs("heads")));
+    const std::vector<std::string> lines = split(run({"branches"}).output, '\n');
+    EXPECT_THAT(lines, testing::Contains("\"quo\\\"te\""));
+    EXPECT_THAT(lines, testing::Contains("\"\\377\\376\""));
+    EXPECT_THAT(lines, testing::Contains("ub\xC3\xBC"));
+}
+
+TEST_F(ShellBranches, OfRemoteRepositoriesAreListedApart)
+{
+    repository_.git({"branch", "topic"});
+    const GitRepository clone = GitRepository::clone(repository_.path(), folder() / "clone");
+    EXPECT_EQ(runIn(clone.path(), {"branches"}).output, "main\n");
+    EXPECT_EQ(
+        sorted(split(runIn(clone.path(), {"branches", "-r"}).output, '\n')),
+        sorted(split(clone.git({"for-each-ref", "--format=%(refname:lstrip=2)", "refs/remotes"}),
+                     '\n')));
+    EXPECT_EQ(run({"branches", "-r"}).output, "");
+}
+
+TEST_F(ShellBranches, AreNoneBeforeTheFirstCommit)
+{
+    const GitRepository empty = makeRepository("empty");
+    const CommandResult result = runIn(empty.path(), {"branches"});
+    EXPECT_EQ(result.exitStatus, 0);
+    EXPECT_EQ(result.output, "");
+}
+
+TEST_F(ShellBranches, AreCountedForAPerson)
+{
+    const auto show = [this]
+    {
+        return runOnTerminal(
+                   {"env", "TERM=xterm", VCLINK_SHELL, "-C", repository_.path(), "branches"})
+            .text;
+    };
+    EXPECT_EQ(show(), "main\n1 branch\n");
+    repository_.git({"branch", "topic"});
+    EXPECT_EQ(show(), "main\ntopic\n2 branches\n");
+}
+
+TEST_F(ShellBranches, AreMadeAtABranchATagOrHead)
+{
+    const std::string begin = head();
+    repository_.git({"tag", "v1"});
+    makeBranch("other", {{"a", "theirs\n"}});
+    succeed({"branch", "one", "other"});
+    succeed({"branch", "two", "v1"});
+    succeed({"branch", "three", "HEAD"});
+    EXPECT_EQ(idOf("one"), idOf("other"));
+    EXPECT_EQ(idOf("two"), begin);
+    EXPECT_EQ(idOf("three"), begin);
+    EXPECT_EQ(repository_.line({"symbolic-ref", "HEAD"}), "refs/heads/main");
+    EXPECT_EQ(repository_.read("a"), "a\n");
+}
+
+TEST_F(ShellBranches, AreMadeAndDeletedWhateverTheirNames)
+{
+    for (const auto &name : {"{}", "++", "a,b", "quo\"te", "a'b$(c", "ub\xC3\xBC", "%s"})
+    {
+        succeed({"branch", name, "main"});
+        EXPECT_EQ(idOf(name), head()) << name;
+        succeed({"branch", "-d", name});
+    }
+    EXPECT_THAT(refs("heads"), ElementsAre("main"));
+}
+
+TEST_F(ShellBranches, AreDeletedMergedOrNot)
+{
+    makeBranch("other", {{"a", "theirs\n"}});
+    repository_.git({"branch", "same"});
+    succeed({"branch", "-d", "other"});
+    succeed({"branch", "same", "-d"});
+    EXPECT_THAT(refs("heads"), ElementsAre("main"));
+}
+
+TEST_F(ShellBranches, AreNotMadeOrDeletedWhereThatCannotBe)
+{
+    repository_.git({"tag", "v1"});
+    repository_.git({"branch", "topic"});
+    const std::string text = "Git could not complete the operation: ";
+    const struct
+    {
+        std::vector<std::string> arguments;
+        std::string reason;
+    } cases[] = {
+        {{"branch", "topic", "main"}, "a reference with that name already exists"},
+        {{"branch", "new", "nothing"}, "no reference found for shorthand 'nothing'"},
+        {{"branch", "new", head()}, "no reference found for shorthand"},
+        {{"branch", "two words", "main"}, "not valid"},
+        {{"branch", "topic/below", "main"}, "topic"},
+        {{"branch", "-d", "main"}, "it is the current HEAD"},
+        {{"branch", "-d", "nothing"}, "cannot locate local branch 'nothing'"},
+        {{"branch", "-d", "v1"}, "cannot locate local branch 'v1'"},
+        {{"branch", "-d", "refs/heads/topic"}, "cannot locate local branch"},
+        {{"branch", "-d", "--", "-x"}, "'-x'"},
+    };
+    for (const auto &[arguments, reason] : cases)
+    {
+        const std::string errors = refuse(arguments);
+        EXPECT_THAT(errors, StartsWith(text));
+        EXPECT_THAT(errors, HasSubstr(reason));
+    }
+}
+
+TEST_F(ShellBranches, TellTheirFailuresInTheLanguageThatWasAskedFor)
+{
+    EXPECT_THAT(refuse({"--lang", "de", "branch", "-d", "main"}),
+                StartsWith("Git konnte den Vorgang nicht abschließen: "));
+}
+
+} // namespace
+} // namespace vclink::test

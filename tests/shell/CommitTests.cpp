@@ -1,0 +1,179 @@
+// SPDX-License-Identifier: MIT
+#include <gmock/gmock.h>
+#include <unistd.h>
+
+#include "ChangeTest.hpp"
+#include "runOnTerminal.hpp"
+
+namespace vclink::test
+{
+namespace
+{
+
+using testing::ElementsAre;
+using testing::HasSubstr;
+using testing::IsEmpty;
+using testing::Not;
+using testing::Pair;
+
+class ShellCommit : public ChangeTest
+{
+  protected:
+    void setIdentity() const
+    {
+        repository_.git({"config", "user.name", "A. U. Thor"});
+        repository_.git({"config", "user.email", "author@example.org"});
+    }
+    /// The commit at HEAD below its first lines, byte by byte.
+    std::string message() const
+    {
+        const std::string commit = repository_.git({"cat-file", "commit", "HEAD"});
+        return commit.substr(commit.find("\n\n") + 2);
+    }
+    std::string format(const std::string &what) const
+    {
+        return repository_.line({"log", "-1", "--format=" + what});
+    }
+};
+
+TEST_F(ShellCommit, TakesAllChangesOfTrackedFiles)
+{
+    setIdentity();
+    const std::string before = repository_.line({"rev-parse", "HEAD"});
+    repository_.write("a", "edited\n");
+    repository_.remove("b");
+    repository_.write("new", "");
+    repository_.write("added", "");
+    succeed({"add", "added"});
+    succeed({"rm", "folder/c"});
+    succeed({"commit", "-m", "Work"});
+    EXPECT_THAT(committed(), ElementsAre(".gitignore", "a", "added", "folder/deep/d"));
+    EXPECT_EQ(repository_.git({"show", "HEAD:a"}), "edited\n");
+    EXPECT_THAT(letters(), ElementsAre(Pair("folder/c", "??"), Pair("new", "??")));
+    EXPECT_EQ(format("%P"), before);
+    EXPECT_EQ(format("%an <%ae> %cn <%ce>"),
+              "A. U. Thor <author@example.org> A. U. Thor <author@example.org>");
+}
+
+TEST_F(ShellCommit, TakesTheMessageAsItStands)
+{
+    setIdentity();
+    for (const std::string &text :
+         {std::string(), std::string("  two\n\nlines \n\n"), std::string("-m"), std::string("--"),
+          std::string("--as-is"), std::string("[a,b]"), std::string("{}"), std::string("#"),
+          std::string("Gr\xC3\xBC\xC3\x9F"
+                      "e \xF0\x9F\x8C\x8D"),
+          std::string("not UTF-8 \xFF \xE2\x82"), std::string(100'000, 'x')})
+    {
+        succeed({"commit", "-m", text});
+        EXPECT_EQ(message(), text);
+    }
+}
+
+TEST_F(ShellCommit, TakesAMessageThatIsGivenInOneWordWithItsOption)
+{
+    setIdentity();
+    succeed({"commit", "-mone word"});
+    EXPECT_EQ(message(), "one word");
+}
+
+TEST_F(ShellCommit, MakesAnIdentityFromTheUserAndTheHost)
+{
+    char host[1024] = {};
+    ASSERT_EQ(::gethostname(host, sizeof host), 0);
+    const CommandResult result =
+        shell({"commit", "-m", "Work"}).in(repository_.path()).environment("USER", "builder").run();
+    EXPECT_EQ(result.exitStatus, 0) << result.errors;
+    EXPECT_EQ(format("%an %ae"), std::string("builder builder@") + host);
+}
+
+TEST_F(ShellCommit, IsRefusedWithoutAnyIdentity)
+{
+    repository_.write("a", "edited\n");
+    EXPECT_EQ(refuse({"commit", "-m", "Work"}),
+              "Git does not know who makes this commit. Set user.name and user.email in the Git "
+              "configuration, and try again.\n");
+}
+
+TEST_F(ShellCommit, IsRefusedWhileFilesAreInConflict)
+{
+    setIdentity();
+    makeConflict();
+    repository_.write("new", "");
+    EXPECT_EQ(refuse({"commit", "-m", "Work"}),
+              "Nothing was committed, because these files are in conflict:\n"
+              "  a\n"
+              "Make each as it should be, and mark it with \"vclink-shell resolved\". With --as-is "
+              "the commit\ntakes them as they stand, with any conflict markers.\n");
+}
+
+TEST_F(ShellCommit, TakesFilesInConflictAsTheyStandWhenToldTo)
+{
+    setIdentity();
+    makeConflict();
+    const std::string other = repository_.line({"rev-parse", "other"});
+    const std::string before = repository_.line({"rev-parse", "main"});
+    const std::string text = repository_.read("a");
+    ASSERT_THAT(text, HasSubstr("<<<<<<<"));
+    succeed({"commit", "--as-is", "-m", "As it is"});
+    EXPECT_EQ(repository_.git({"show", "HEAD:a"}), text);
+    EXPECT_EQ(format("%P"), before + ' ' + other);
+    EXPECT_THAT(letters(), IsEmpty());
+    EXPECT_FALSE(std::filesystem::exists(repository_ / ".git/MERGE_HEAD"));
+}
+
+TEST_F(ShellCommit, ConcludesAMergeOnceItsConflictIsResolved)
+{
+    setIdentity();
+    makeConflict();
+    repository_.write("a", "solution\n");
+    succeed({"resolved", "a"});
+    succeed({"commit", "-m", "Merge"});
+    EXPECT_EQ(split(format("%P"), ' ').size(), 2U);
+    EXPECT_EQ(repository_.git({"show", "HEAD:a"}), "solution\n");
+    EXPECT_EQ(repository_.git({"show", "HEAD:b"}), "theirs\n");
+    EXPECT_FALSE(std::filesystem::exists(repository_ / ".git/MERGE_HEAD"));
+}
+
+TEST_F(ShellCommit, MakesTheFirstCommitOfARepository)
+{
+    const GitRepository empty = makeRepository("empty");
+    empty.write("file", "");
+    EXPECT_EQ(runIn(empty.path(), {"add", "file"}).exitStatus, 0);
+    EXPECT_EQ(
+        shell({"commit", "-m", "First"}).in(empty.path()).environment("LOGNAME", "me").run().errors,
+        "");
+    EXPECT_EQ(empty.git({"log", "--format=%an %s %P"}), "me First \n");
+    EXPECT_EQ(empty.git({"status", "--porcelain"}), "");
+}
+
+TEST_F(ShellCommit, CountsNoFileThatASparseCheckoutLeavesOut)
+{
+    setIdentity();
+    repository_.git({"update-index", "--skip-worktree", "b"});
+    repository_.remove("b");
+    repository_.write("a", "edited\n");
+    const TerminalResult result = runOnTerminal(
+        {"env", "TERM=dumb", VCLINK_SHELL, "-C", repository_.path().string(), "commit", "-m", "x"});
+    EXPECT_EQ(result.text, "Committed 1 file.\n");
+    EXPECT_THAT(committed(), ElementsAre(".gitignore", "a", "b", "folder/c", "folder/deep/d"));
+}
+
+TEST_F(ShellCommit, KeepsControlCharactersOfNamesInConflictFromTheTerminal)
+{
+    repository_.write("\33[31m", "begin\n");
+    repository_.commitAll("odd");
+    repository_.git({"checkout", "--quiet", "-b", "odd"});
+    repository_.write("\33[31m", "theirs\n");
+    repository_.commitAll("theirs");
+    repository_.git({"checkout", "--quiet", "main"});
+    repository_.write("\33[31m", "ours\n");
+    repository_.commitAll("ours");
+    repository_.tryGit({"-c", "user.name=A", "-c", "user.email=a@example.org", "merge", "odd"});
+    const std::string reason = refuse({"commit", "-m", "Work"});
+    EXPECT_THAT(reason, HasSubstr("  \"\\033[31m\"\n"));
+    EXPECT_THAT(reason, Not(HasSubstr("\33")));
+}
+
+} // namespace
+} // namespace vclink::test

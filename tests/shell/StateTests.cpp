@@ -1,0 +1,92 @@
+// SPDX-License-Identifier: MIT
+#include <gmock/gmock.h>
+
+#include "ShellMergeTest.hpp"
+
+namespace vclink::test
+{
+namespace
+{
+
+using testing::HasSubstr;
+using testing::StartsWith;
+
+class ShellState : public ShellMergeTest
+{
+};
+
+TEST_F(ShellState, NamesTheCurrentBranch)
+{
+    EXPECT_EQ(run({"current"}).output, "main\n");
+    repository_.git({"checkout", "--quiet", "-b", "group/quo\"te"});
+    EXPECT_EQ(run({"current"}).output, "\"group/quo\\\"te\"\n");
+}
+
+TEST_F(ShellState, HasNoCurrentBranchBeforeTheFirstCommitOrOnACommit)
+{
+    const GitRepository empty = makeRepository("empty");
+    const CommandResult unborn = runIn(empty.path(), {"current"});
+    EXPECT_EQ(unborn.exitStatus, 1);
+    EXPECT_EQ(unborn.output, "");
+    EXPECT_THAT(unborn.errors, HasSubstr("refs/heads/main"));
+    repository_.git({"checkout", "--quiet", "--detach"});
+    EXPECT_THAT(refuse({"current"}), StartsWith("Git could not complete the operation: "));
+}
+
+TEST_F(ShellState, ShowsTheIdThatGitGivesARevision)
+{
+    commitFiles({{"a", "edited\n"}});
+    repository_.git({"tag", "-a", "-m", "tagged", "v1"});
+    for (const std::string revision :
+         {"HEAD", "main", "main~1", "HEAD^", "v1", "v1^{commit}", "HEAD:folder/c", "HEAD:folder",
+          "main^{tree}", ":/begin", "@{0}", "refs/heads/main"})
+    {
+        const CommandResult result = run({"rev", revision});
+        EXPECT_EQ(result.exitStatus, 0) << revision << result.errors;
+        EXPECT_EQ(result.output, repository_.git({"rev-parse", revision})) << revision;
+    }
+    EXPECT_EQ(run({"rev", head().substr(0, 8)}).output, head() + '\n');
+}
+
+TEST_F(ShellState, ShowsNoIdOfWhatNamesNothing)
+{
+    EXPECT_EQ(refuse({"rev", "nothing"}),
+              "Git could not complete the operation: revspec 'nothing' not found (code -3, "
+              "category 4)\n");
+    EXPECT_THAT(refuse({"--lang", "de", "rev", "HEAD:nothing"}),
+                StartsWith("Git konnte den Vorgang nicht abschließen: "));
+    for (const std::string revision : {"HEAD~7", "main..main", "[a]", "{}", "++"})
+        EXPECT_THAT(refuse({"rev", revision}), StartsWith("Git could not complete"));
+}
+
+TEST_F(ShellState, TellsWhichOperationIsUnfinished)
+{
+    EXPECT_EQ(state(), "Normal\n");
+    clash();
+    EXPECT_EQ(repository_.tryGit({"merge", "other"}).exitStatus, 1);
+    EXPECT_EQ(state(), "Conflicts\n");
+    repository_.git({"merge", "--abort"});
+    EXPECT_EQ(state(), "Normal\n");
+    EXPECT_EQ(repository_.tryGit({"cherry-pick", "other"}).exitStatus, 1);
+    EXPECT_EQ(state(), "Conflicts\n");
+    repository_.git({"cherry-pick", "--abort"});
+    EXPECT_NE(repository_.tryGit({"rebase", "other"}).exitStatus, 0);
+    EXPECT_THAT(state(), StartsWith("Rebase"));
+    repository_.git({"rebase", "--abort"});
+    repository_.git({"bisect", "start"});
+    EXPECT_EQ(state(), "Bisecting\n");
+}
+
+TEST_F(ShellState, CannotBeToldOutsideAWorkingCopy)
+{
+    std::filesystem::create_directory(folder() / "plain");
+    for (const std::string command : {"state", "current", "branches"})
+    {
+        const CommandResult result = runIn(folder() / "plain", {command});
+        EXPECT_EQ(result.exitStatus, 1) << command;
+        EXPECT_THAT(result.errors, HasSubstr("nor any folder above it is a Git working copy"));
+    }
+}
+
+} // namespace
+} // namespace vclink::test

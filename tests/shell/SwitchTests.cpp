@@ -1,0 +1,182 @@
+// SPDX-License-Identifier: MIT
+#include <gmock/gmock.h>
+#include <sys/wait.h>
+
+#include "ShellMergeTest.hpp"
+#include "TerminalProcess.hpp"
+#include "runOnTerminal.hpp"
+
+namespace vclink::test
+{
+namespace
+{
+
+using testing::EndsWith;
+using testing::HasSubstr;
+using testing::StartsWith;
+
+class ShellSwitch : public ShellMergeTest
+{
+  protected:
+    ShellSwitch()
+    {
+        makeBranch("other", {{"a", "theirs\n"}, {"new", "theirs\n"}});
+    }
+    std::string current() const
+    {
+        return repository_.line({"symbolic-ref", "HEAD"});
+    }
+};
+
+TEST_F(ShellSwitch, PutsTheFilesOfABranchOnTheDiskAndMakesItTheCurrentOne)
+{
+    const GitRepository twin = makeTwin();
+    succeed({"switch", "other"});
+    twin.git({"checkout", "--quiet", "other"});
+    EXPECT_EQ(current(), "refs/heads/other");
+    EXPECT_EQ(describe(repository_), describe(twin));
+    succeed({"switch", "main"});
+    EXPECT_EQ(current(), "refs/heads/main");
+    EXPECT_FALSE(std::filesystem::exists(repository_ / "new"));
+}
+
+TEST_F(ShellSwitch, KeepsChangesOfFilesThatTheBranchDoesNotTouch)
+{
+    repository_.write("b", "edited\n");
+    repository_.remove("folder/c");
+    succeed({"switch", "other"});
+    EXPECT_EQ(current(), "refs/heads/other");
+    EXPECT_EQ(repository_.read("b"), "edited\n");
+    EXPECT_EQ(letters().at("folder/c"), " D");
+}
+
+TEST_F(ShellSwitch, ChangesNothingWhereAChangeIsInTheWay)
+{
+    repository_.write("a", "edited\n");
+    EXPECT_THAT(refuse({"switch", "other"}), HasSubstr("1 conflict prevents checkout"));
+    EXPECT_THAT(refuse({"--lang", "de", "switch", "other"}),
+                StartsWith("Git konnte den Vorgang nicht abschließen: "));
+}
+
+TEST_F(ShellSwitch, GoesToLocalBranchesOnly)
+{
+    repository_.git({"tag", "v1"});
+    for (const std::string name : {"nothing", "v1", "HEAD", "refs/heads/other", "other~0"})
+        EXPECT_THAT(refuse({"switch", name}), HasSubstr("cannot locate local branch '" + name));
+    EXPECT_THAT(refuse({"switch", head()}), HasSubstr("cannot locate local branch"));
+}
+
+TEST_F(ShellSwitch, GoesToABranchWhateverItsName)
+{
+    for (const std::string name : {"{}", "++", "a,b", "quo\"te", "ub\xC3\xBC", "#hash", "a'b$(c"})
+    {
+        repository_.git({"update-ref", "refs/heads/" + name, "refs/heads/other"});
+        succeed({"switch", name});
+        EXPECT_EQ(current(), "refs/heads/" + name);
+        EXPECT_EQ(repository_.read("a"), "theirs\n");
+        succeed({"switch", "main"});
+    }
+}
+
+TEST_F(ShellSwitch, RefusesABranchWhoseFilesWouldBeThoseOfATag)
+{
+    repository_.git({"tag", "other", "main"});
+    EXPECT_EQ(refuse({"switch", "other"}), "Nothing was switched: other is a tag too, whose files "
+                                           "would be taken for the branch's.\n");
+    repository_.git({"tag", "--force", "-a", "-m", "same", "other", "refs/heads/other"});
+    succeed({"switch", "other"});
+    EXPECT_EQ(repository_.read("a"), "theirs\n");
+}
+
+TEST_F(ShellSwitch, ShowsItsProgress)
+{
+    const CommandResult result = run({"--progress", "always", "switch", "other"});
+    EXPECT_EQ(result.exitStatus, 0);
+    EXPECT_THAT(result.errors, HasSubstr("Checking out "));
+    EXPECT_THAT(result.errors, EndsWith("\r\33[K"));
+}
+
+TEST_F(ShellSwitch, TellsAPersonWhichBranchIsTheCurrentOne)
+{
+    const TerminalResult result = runOnTerminal(
+        {"env", "TERM=dumb", VCLINK_SHELL, "-C", repository_.path(), "switch", "other"});
+    EXPECT_EQ(result.exitStatus, 0);
+    EXPECT_EQ(result.text, "The current branch is other.\n");
+}
+
+/// A branch that changes many files, so that there is time for Ctrl-C.
+class ShellInterruptOfBranches : public ShellMergeTest
+{
+  protected:
+    static constexpr int fileCount = 1000;
+
+    ShellInterruptOfBranches()
+    {
+        write("begin\n");
+        repository_.commitAll("many");
+        repository_.git({"checkout", "--quiet", "-b", "other"});
+        write("theirs\n");
+        repository_.commitAll("all changed");
+        repository_.git({"checkout", "--quiet", "main"});
+    }
+
+    void write(const std::string &text) const
+    {
+        // Long, so that what is written of each file soon fills the terminal.
+        for (int number = 0; number < fileCount; ++number)
+            repository_.write("many/" + std::string(150, 'x') + std::to_string(number), text);
+    }
+
+    /// A script that runs the program, as "$0", and is interrupted when this has appeared.
+    int interrupt(const std::string &script, const std::string &sign, std::string &text) const
+    {
+        TerminalProcess process({"env", "TERM=xterm",
+                                 "LSAN_OPTIONS=print_suppressions=0:suppressions=" //
+                                 VCLINK_LEAK_SUPPRESSIONS,
+                                 "sh", "-c", script, VCLINK_SHELL},
+                                repository_.path());
+        process.readUntil(sign);
+        process.interrupt();
+        text = process.readAll();
+        const int status = process.wait();
+        return WIFEXITED(status) ? WEXITSTATUS(status) : -1;
+    }
+};
+
+TEST_F(ShellInterruptOfBranches, CancelsASwitchThatHasChangedNothing)
+{
+    const std::string before = describe(repository_);
+    std::string text;
+    EXPECT_EQ(interrupt("exec \"$0\" --log progress switch other", "Checkout Notify", text), 130);
+    EXPECT_THAT(text, EndsWith("\nvclink-shell: The operation was cancelled.\n"));
+    EXPECT_EQ(repository_.line({"symbolic-ref", "HEAD"}), "refs/heads/main");
+    EXPECT_EQ(describe(repository_), before);
+    EXPECT_FALSE(std::filesystem::exists(repository_ / ".git/index.lock"));
+    succeed({"switch", "other"});
+    EXPECT_EQ(repository_.git({"status", "--porcelain"}), "");
+}
+
+TEST_F(ShellInterruptOfBranches, ComesTooLateOnceFilesAreWritten)
+{
+    std::string text;
+    EXPECT_EQ(interrupt("exec \"$0\" --log parameter switch other", "completed_steps=1 ", text), 0);
+    EXPECT_THAT(text, HasSubstr("It was too far on to be stopped.\n"));
+    EXPECT_EQ(repository_.line({"symbolic-ref", "HEAD"}), "refs/heads/other");
+    EXPECT_EQ(repository_.git({"status", "--porcelain"}), "");
+}
+
+TEST_F(ShellInterruptOfBranches, CancelsAMergeThatHasChangedNothing)
+{
+    commitFiles({{"a", "ours\n"}});
+    const std::string before = describe(repository_);
+    std::string text;
+    EXPECT_EQ(interrupt("exec \"$0\" --log progress merge other", "Checkout Notify", text), 130);
+    EXPECT_THAT(text, HasSubstr("\nvclink-shell: \"other\" could not be merged into the current "
+                                "branch.\n"));
+    EXPECT_THAT(text, testing::Not(HasSubstr("in conflict")));
+    EXPECT_EQ(describe(repository_), before);
+    EXPECT_EQ(state(), "Normal\n");
+}
+
+} // namespace
+} // namespace vclink::test
