@@ -1,7 +1,6 @@
 // SPDX-License-Identifier: MIT
 #include "Comparison.hpp"
 
-#include <algorithm>
 #include <filesystem>
 #include <fstream>
 #include <sstream>
@@ -9,6 +8,7 @@
 #include <gtest/gtest.h>
 #include <sys/stat.h>
 
+#include "listedNames.hpp"
 #include "moves.hpp"
 #include "quoting.hpp"
 #include "support/TestInteractor.hpp"
@@ -41,22 +41,6 @@ std::map<std::string, std::string> takeSnapshot(const fs::path &folder)
         snapshot[entry.path().string()] = text.str();
     }
     return snapshot;
-}
-
-bool isBelow(const std::string &path, const std::string &folder)
-{
-    return path.compare(0, folder.size() + 1, folder + '/') == 0;
-}
-
-/// Whether a name in a list means a path: the file itself, and all below a folder of that name. A
-/// name that has to be escaped is a pattern, which must match the whole path.
-bool isMeant(const std::string &path, const std::string &name)
-{
-    static const std::string whiteSpace = " \t\r\n\v\f";
-    const bool escaped = name.front() == '#' || name.front() == '!' ||
-                         whiteSpace.find(name.back()) != std::string::npos ||
-                         name.find_first_of("\n\v\f") != std::string::npos;
-    return path == name || (!escaped && isBelow(path, name));
 }
 
 std::string describeState(const States &states, const std::string &path)
@@ -116,12 +100,7 @@ void Comparison::compareFiles()
         files.push_back(inRoot(name));
     }
     compare(title, adapter_->getFileStates(files),
-            [&names](const std::string &path)
-            {
-                return std::any_of(names.begin(), names.end(),
-                                   [&path](const std::string &name)
-                                   { return isMeant(path, name); });
-            });
+            [&names](const std::string &path) { return isMeant(path, names); });
 }
 
 void Comparison::compare(const std::string &asked, const FileStateMap &actual,
@@ -147,7 +126,7 @@ std::vector<std::string> Comparison::someFolders()
     for (const auto &[path, file] : report_)
     {
         const std::string folder = fs::path(path).parent_path().string();
-        if (!folder.empty() && isPlain(folder) && random_.chance(30))
+        if (!folder.empty() && isPlain(root_, folder) && random_.chance(30))
         {
             folders.insert(folder);
         }
@@ -160,30 +139,12 @@ std::vector<std::string> Comparison::someFiles()
     std::vector<std::string> files;
     for (const auto &[path, file] : report_)
     {
-        if (isPlain(path) && random_.chance(40))
+        if (isPlain(root_, path) && random_.chance(40))
         {
             files.push_back(path);
         }
     }
     return files;
-}
-
-/// Whether a name means itself in a list: no pattern, and no link on the way or at the end.
-bool Comparison::isPlain(const std::string &path) const
-{
-    if (path.find_first_of("*?[\\") != std::string::npos || path.back() == '/')
-    {
-        return false;
-    }
-    for (fs::path part = path; !part.empty(); part = part.parent_path())
-    {
-        std::error_code missing;
-        if (fs::is_symlink(fs::symlink_status(root_ / part, missing)))
-        {
-            return false;
-        }
-    }
-    return true;
 }
 
 upath Comparison::inRoot(const std::string &path) const

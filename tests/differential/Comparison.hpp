@@ -47,7 +47,6 @@ class Comparison
 
     std::vector<std::string> someFolders();
     std::vector<std::string> someFiles();
-    bool isPlain(const std::string &path) const;
     upath inRoot(const std::string &path) const;
     std::string describe(const States &found, const States &expected) const;
     std::string describeReport(const std::string &path) const;

@@ -3,6 +3,7 @@
 #include <memory>
 #include <string>
 
+#include <git2/errors.h>
 #include <gtest/gtest.h>
 
 #include "support/GitTest.hpp"
@@ -10,15 +11,18 @@
 #include "support/TestInteractor.hpp"
 #include "support/text.hpp"
 #include "vclink/git/GitAdapterFactory.hpp"
+#include "vclink/git/LibGit2Exception.hpp"
 
-/// What the library says where git says something else, for states that the random working copies
-/// keep clear of.
+/// What the library says or does where git does something else, for states and changes that the
+/// random working copies and sequences keep clear of.
 namespace
 {
 
 using vclink::FileState;
+using vclink::git::LibGit2Exception;
 using vclink::test::asBytes;
 using vclink::test::asPath;
+using vclink::test::asUtf8;
 using vclink::test::GitRepository;
 using States = std::map<std::string, FileState::State>;
 
@@ -29,14 +33,18 @@ class DifferencesFromGit : public vclink::test::GitTest
     States statesOf(const GitRepository &repository) const
     {
         const std::string root = repository.path().string();
-        const auto adapter = vclink::git::GitAdapterFactory().createAdapterFor(
-            asPath(root), std::make_shared<vclink::test::TestInteractor>());
+        const auto adapter = makeAdapter(repository);
         States states;
         for (const auto &[path, state] : adapter->getFolderStates(asPath(root)))
         {
             states.emplace(asBytes(path).substr(root.size() + 1), state.getState());
         }
         return states;
+    }
+    static std::unique_ptr<vclink::CMAdapter> makeAdapter(const GitRepository &repository)
+    {
+        return vclink::git::GitAdapterFactory().createAdapterFor(
+            asPath(repository.path()), std::make_shared<vclink::test::TestInteractor>());
     }
     static std::string statusOf(const GitRepository &repository)
     {
@@ -114,6 +122,78 @@ TEST_F(DifferencesFromGit, ASubmoduleWhosePathHoldsALineFeedHidesAllStates)
     repository.commitAll("first");
     EXPECT_EQ(statusOf(repository), "");
     EXPECT_EQ(statesOf(repository), States());
+}
+
+// git takes the file away; libgit2 makes no folder where a file stands. The index is put back
+// first.
+TEST_F(DifferencesFromGit, AFileThatTookTheirFoldersPlaceIsInTheWayOfARevert)
+{
+    auto repository = makeRepository();
+    repository.write("folder/file", "x");
+    repository.commitAll("first");
+    repository.remove("folder");
+    repository.write("folder", "instead");
+    repository.git({"rm", "--quiet", "--cached", "folder/file"});
+    const auto adapter = makeAdapter(repository);
+    try
+    {
+        adapter->revertFiles({asPath(repository / "folder/file")});
+        ADD_FAILURE() << "nothing was raised";
+    }
+    catch (const LibGit2Exception &exception)
+    {
+        EXPECT_EQ(exception.getError().getCode(), GIT_EEXISTS);
+    }
+    EXPECT_EQ(repository.read("folder"), "instead");
+    EXPECT_EQ(statusOf(repository), " D folder/file\n?? folder\n");
+    repository.git({"checkout-index", "--force", "folder/file"});
+    EXPECT_EQ(statusOf(repository), "");
+}
+
+// libgit2 adds the file to the index, which takes the folder's files out of it, and fails to take
+// them out once more, though only where the file is the index's first. Nothing is changed then.
+TEST_F(DifferencesFromGit, AStagedFolderThatTookAFilesPlaceIsInTheWayOfARevert)
+{
+    auto repository = makeRepository();
+    repository.write("a", "x");
+    repository.commitAll("first");
+    repository.remove("a");
+    repository.write("a/inner", "x");
+    repository.add();
+    const std::string before = statusOf(repository);
+    try
+    {
+        makeAdapter(repository)->revertFiles({asPath(repository / "a")});
+        ADD_FAILURE() << "nothing was raised";
+    }
+    catch (const LibGit2Exception &exception)
+    {
+        EXPECT_EQ(asUtf8(exception.getError().getMessage()), "index does not contain a/inner");
+    }
+    EXPECT_EQ(statusOf(repository), before);
+    repository.git({"reset", "--quiet", "--", "a"});
+    EXPECT_EQ(statusOf(repository), " D a\n?? a/inner\n");
+}
+
+// git takes the folder's files out of the index. libgit2 does that for what the list's pattern
+// matches, and a name that has to be escaped is a pattern for itself alone. A commit mends it.
+TEST_F(DifferencesFromGit, AFileWithAnEscapedNameIsStagedBesideTheFolderThatItReplaces)
+{
+    auto repository = makeRepository();
+    repository.write("#folder/file", "x");
+    repository.write(" first", "x");
+    repository.commitAll("first");
+    repository.git({"config", "user.name", "Somebody"});
+    repository.git({"config", "user.email", "somebody@example.com"});
+    repository.remove("#folder");
+    repository.write("#folder", "instead");
+    const auto adapter = makeAdapter(repository);
+    adapter->markResolved(asPath(repository / "#folder"));
+    EXPECT_EQ(repository.git({"ls-files"}), " first\n#folder\n#folder/file\n");
+    adapter->commit(upath(), u"second");
+    EXPECT_EQ(repository.git({"ls-files"}), " first\n#folder\n");
+    EXPECT_EQ(statusOf(repository), "");
+    EXPECT_TRUE(repository.tryGit({"fsck", "--strict"}).succeeded());
 }
 
 } // namespace

@@ -71,14 +71,15 @@ void readRecord(const std::string &record, GitReport &report)
     }
 }
 
-/// "mode id stage<TAB>path"
+/// "tag mode id stage<TAB>path"
 void readIndexEntry(const std::string &record, GitReport &report)
 {
     const std::size_t tab = record.find('\t');
     std::istringstream fields(record.substr(0, tab));
     GitFile &file = report[record.substr(tab + 1)];
     int stage = 0;
-    fields >> file.indexMode >> file.indexId >> stage;
+    std::string tag;
+    fields >> tag >> file.indexMode >> file.indexId >> stage;
     file.unmerged = stage != 0;
 }
 
@@ -117,14 +118,25 @@ std::string runGitStatus(const GitRepository &repository)
                            "--untracked-files=all", "--no-renames"});
 }
 
+std::string listIndex(const GitRepository &repository)
+{
+    return repository.git({"ls-files", "-z", "-v", "--stage"});
+}
+
 GitReport readGitReport(const GitRepository &repository, const std::string &status)
+{
+    return readGitReport(repository, status, listIndex(repository));
+}
+
+GitReport readGitReport(const GitRepository &repository, const std::string &status,
+                        const std::string &index)
 {
     GitReport report;
     for (const auto &record : splitAtNul(status))
     {
         readRecord(record, report);
     }
-    for (const auto &record : splitAtNul(repository.git({"ls-files", "-z", "--stage"})))
+    for (const auto &record : splitAtNul(index))
     {
         readIndexEntry(record, report);
     }

@@ -38,7 +38,12 @@ using GitReport = std::map<std::string, GitFile>;
 /// What `git status` says, all paths being listed one by one, and nothing as renamed.
 std::string runGitStatus(const GitRepository &repository);
 
-/// The paths of a status, and those that `git ls-files` lists besides, which are unchanged.
+/// What `git ls-files` says of the index, stages and all.
+std::string listIndex(const GitRepository &repository);
+
+/// The paths of a status, and those that the index lists besides, which are unchanged.
+GitReport readGitReport(const GitRepository &repository, const std::string &status,
+                        const std::string &index);
 GitReport readGitReport(const GitRepository &repository, const std::string &status);
 
 /// Contents by ids.

@@ -1,0 +1,98 @@
+// SPDX-License-Identifier: MIT
+#include <cstdlib>
+#include <exception>
+#include <filesystem>
+#include <fstream>
+#include <map>
+#include <string>
+
+#include <gtest/gtest.h>
+
+#include "ChangeSequence.hpp"
+#include "support/GitTest.hpp"
+#include "support/LibGit2Session.hpp"
+
+namespace
+{
+
+namespace fs = std::filesystem;
+using vclink::test::ChangeSequence;
+
+constexpr std::uint64_t blockCount = 10;
+constexpr std::uint64_t sequencesInBlock = 30;
+
+/// 30 sequences a block; a block ends with the first that fails, and prints its seed and what was
+/// done. To run one sequence again, run this program with the seed in VCLINK_SEED; every block is
+/// that sequence alone then. VCLINK_KEEP besides names a path to which its working copies are moved
+/// in the end.
+class ChangeSequences : public vclink::test::GitTest,
+                        public testing::WithParamInterface<std::uint64_t>
+{
+  protected:
+    ChangeSequences()
+    {
+        std::ofstream(environment().home() / ".gitconfig")
+            << "[user]\n\tname = Somebody\n\temail = somebody@example.com\n";
+    }
+
+    void run(std::uint64_t seed)
+    {
+        const fs::path path = folder() / std::to_string(seed);
+        ChangeSequence sequence(seed, path);
+        try
+        {
+            sequence.run();
+        }
+        catch (const std::exception &exception)
+        {
+            ADD_FAILURE() << exception.what();
+        }
+        if (HasFailure())
+        {
+            ADD_FAILURE() << "in the sequence of VCLINK_SEED=" << seed << ":\n"
+                          << sequence.script();
+        }
+        for (const auto &[change, count] : sequence.counts())
+        {
+            counts_[change] += count;
+        }
+        if (const char *kept = std::getenv("VCLINK_KEEP"))
+        {
+            fs::rename(path, kept);
+        }
+        fs::remove_all(path);
+    }
+
+    /// How often each change was made, refusals apart.
+    const std::map<std::string, int> &counts() const
+    {
+        return counts_;
+    }
+
+  private:
+    vclink::test::LibGit2Session session_{environment()};
+    std::map<std::string, int> counts_;
+};
+
+TEST_P(ChangeSequences, LeaveWhatGitLeaves)
+{
+    if (const char *seed = std::getenv("VCLINK_SEED"))
+    {
+        return run(std::stoull(seed));
+    }
+    const std::uint64_t first = GetParam() * sequencesInBlock;
+    for (auto seed = first; seed < first + sequencesInBlock && !HasFailure(); ++seed)
+    {
+        run(seed);
+    }
+    for (const auto *change : {"add", "add: AlreadyAdded", "commit", "commit of a merge",
+                               "markResolved", "merge", "merge with conflicts", "remove",
+                               "remove: NoFilesToRemove", "revert", "revert: Conflicted"})
+    {
+        EXPECT_EQ(counts().count(change), 1u) << change << ": the sequences are too much alike";
+    }
+}
+
+INSTANTIATE_TEST_SUITE_P(Blocks, ChangeSequences, testing::Range<std::uint64_t>(0, blockCount));
+
+} // namespace
