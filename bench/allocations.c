@@ -35,8 +35,15 @@ static void countAllocation(size_t size)
 {
     if (vclinkBenchAllocationCounts.enabled)
     {
-        ++vclinkBenchAllocationCounts.allocations;
-        vclinkBenchAllocationCounts.allocatedBytes += size;
+        struct AllocationCounts *const counts = &vclinkBenchAllocationCounts;
+        ++counts->allocations;
+        counts->allocatedBytes += size;
+        // Less than nothing is held after blocks from before were freed.
+        if (counts->allocatedBytes > counts->freedBytes &&
+            counts->allocatedBytes - counts->freedBytes > counts->peakBytes)
+        {
+            counts->peakBytes = counts->allocatedBytes - counts->freedBytes;
+        }
     }
 }
 

@@ -14,6 +14,8 @@ struct AllocationCounts
     size_t allocatedBytes;
     /// Bytes of blocks freed, also of blocks that were allocated before counting began.
     size_t freedBytes;
+    /// The most bytes that were held at once of what was asked for while counting.
+    size_t peakBytes;
 };
 
 /// Where the preloaded library has its AllocationCounts; to be found with dlsym.

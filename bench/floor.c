@@ -7,44 +7,8 @@
 
 #include <git2.h>
 
+#include "bench/floor_calls.h"
 #include "bench/region.h"
-
-static void fail(const char *what)
-{
-    const git_error *const error = git_error_last();
-    fprintf(stderr, "floor: %s: %s\n", what, error != NULL ? error->message : "no text");
-    exit(1);
-}
-
-static int countStatus(const char *path, unsigned int flags, void *payload)
-{
-    (void)path;
-    (void)flags;
-    ++*(size_t *)payload;
-    return 0;
-}
-
-static size_t walk(const char *root, git_strarray pathspec)
-{
-    size_t count = 0;
-    git_repository *repository = NULL;
-    if (git_repository_open_ext(&repository, root, GIT_REPOSITORY_OPEN_NO_SEARCH, NULL) != 0)
-    {
-        fail(root);
-    }
-    git_status_options options;
-    git_status_options_init(&options, GIT_STATUS_OPTIONS_VERSION);
-    options.show = GIT_STATUS_SHOW_INDEX_AND_WORKDIR;
-    options.flags = GIT_STATUS_OPT_INCLUDE_UNTRACKED | GIT_STATUS_OPT_INCLUDE_UNMODIFIED |
-                    GIT_STATUS_OPT_RECURSE_UNTRACKED_DIRS | GIT_STATUS_OPT_RENAMES_HEAD_TO_INDEX;
-    options.pathspec = pathspec;
-    if (git_status_foreach_ext(repository, &options, countStatus, &count) != 0)
-    {
-        fail("git_status_foreach_ext");
-    }
-    git_repository_free(repository);
-    return count;
-}
 
 static void measureWalk(const char *root, git_strarray pathspec)
 {
@@ -61,30 +25,6 @@ static void measureFolder(const char *root)
     measureWalk(root, (git_strarray){patterns, 1});
 }
 
-/// Reads one name a line; the names hold nothing that a pattern would have to escape.
-static git_strarray readNames(const char *listFile)
-{
-    FILE *const file = fopen(listFile, "r");
-    if (file == NULL)
-    {
-        perror(listFile);
-        exit(1);
-    }
-    git_strarray names = {NULL, 0};
-    char *line = NULL;
-    size_t capacity = 0;
-    while (getline(&line, &capacity, file) > 0)
-    {
-        line[strcspn(line, "\n")] = '\0';
-        names.strings = realloc(names.strings, (names.count + 1) * sizeof(char *));
-        names.strings[names.count++] = line;
-        line = NULL;
-        capacity = 0;
-    }
-    fclose(file);
-    return names;
-}
-
 static void measureProbe(const char *folder)
 {
     beginRegion();
@@ -93,27 +33,11 @@ static void measureProbe(const char *folder)
     printRegion(code == 0);
 }
 
-/// What a host without a library would do: a child process, its output read to the end.
 static void measureChild(const char *root)
 {
-    size_t bytes = 0;
-    char buffer[65536];
     setenv("BENCH_ROOT", root, 1);
     setenv("GIT_OPTIONAL_LOCKS", "0", 1);
-    beginRegion();
-    FILE *const output = popen("exec git -C \"$BENCH_ROOT\" status --porcelain -uall", "r");
-    size_t got = 0;
-    while (output != NULL && (got = fread(buffer, 1, sizeof buffer, output)) > 0)
-    {
-        bytes += got;
-    }
-    const int status = output == NULL ? -1 : pclose(output);
-    endRegion();
-    if (status != 0)
-    {
-        fail("git status");
-    }
-    printRegion(bytes);
+    measureShell("exec git -C \"$BENCH_ROOT\" status --porcelain -uall");
 }
 
 int main(int argc, char **argv)

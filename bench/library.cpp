@@ -1,61 +1,20 @@
 // SPDX-License-Identifier: MIT
 // The library, called as a host calls it. The counterpart of floor.c.
 #include <cstdio>
-#include <cstring>
 #include <exception>
-#include <fstream>
-#include <memory>
 #include <optional>
 #include <string>
 #include <vector>
 
+#include "bench/host.hpp"
 #include "bench/region.h"
-#include "fl/filesystem/path.hpp"
-#include "fl/i18n/convert.hpp"
-#include "vclink/ApplicationInteractor.hpp"
 #include "vclink/git/GitAdapterFactory.hpp"
 #include "vclink/git/LibGit2Guard.hpp"
 
 namespace
 {
 
-class Interactor : public vclink::ApplicationInteractor
-{
-  public:
-    vclink::Terminator &getTerminator() override
-    {
-        return terminator_;
-    }
-    vclink::ProgressReporter *getProgressReporter() override
-    {
-        return nullptr;
-    }
-
-  private:
-    vclink::Terminator terminator_;
-};
-
-upath toPath(const std::string &text)
-{
-    return upath(fl::i18n::utf8_to_ustring(text));
-}
-
-/// One name a line, each made a path below the root.
-std::vector<upath> readPaths(const std::string &root, const char *listFile)
-{
-    std::ifstream list(listFile);
-    std::vector<upath> paths;
-    for (std::string name; std::getline(list, name);)
-    {
-        paths.push_back(toPath(root + "/" + name));
-    }
-    return paths;
-}
-
-std::unique_ptr<vclink::CMAdapter> makeAdapter(const upath &root)
-{
-    return vclink::git::GitAdapterFactory().createAdapterFor(root, std::make_shared<Interactor>());
-}
+using namespace vclink::bench;
 
 void measureFolder(const upath &root)
 {

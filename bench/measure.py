@@ -10,6 +10,8 @@ import subprocess
 import sys
 
 import working_copies
+from branches import BranchBench
+from changes import ChangeBench
 from programs import Programs, Ratios
 from report import Table, write_into
 
@@ -37,6 +39,8 @@ def slope(values):
 class Bench:
     def __init__(self, build, scratch, sizes):
         self._programs = Programs(build, scratch)
+        self._changes = ChangeBench(self._programs, scratch)
+        self._branches = BranchBench(self._programs, scratch)
         self._sizes = sizes
         self._scratch = scratch
         # Short names, since the root stands in every key of the result.
@@ -50,6 +54,8 @@ class Bench:
             working_copies.make_working_copy(root, size, env)
             for count in LISTS:
                 working_copies.write_list(self._list(size, count), count, size)
+        self._changes.make_working_copies(env)
+        self._branches.make_working_copies(env)
 
     def _list(self, size, count):
         return f"{self._roots[size]}.{count}"
@@ -64,6 +70,8 @@ class Bench:
         programs = self._programs
         some = self._roots[self._sizes[0]]
         tasks = {
+            **self._changes.tasks(),
+            **self._branches.tasks(),
             ("less", "instructions"): lambda: programs.instructions(
                 "library", "less", some, self._list(self._sizes[0], 1_000)),
             ("less", "allocations"): lambda: programs.allocations(
@@ -100,9 +108,13 @@ class Bench:
             arguments = ("files", self._roots[size], self._list(size, count))
             self._rounds[size, count] = self._programs.clock(
                 [("floor", *arguments), ("library", *arguments)], LIST_ROUNDS)
+        self._changes.clock()
+        self._branches.clock()
 
     def tables(self):
-        return [self._folder_table(), self._files_table(), self._small_table()]
+        return [self._folder_table(), self._files_table(),
+                self._changes.table(self._counted), self._branches.table(self._counted),
+                self._small_table()]
 
     def _per_file(self, program):
         return {size: self._counted["folder", program, size] / size for size in self._sizes}

@@ -14,6 +14,9 @@ class Programs:
 
     def __init__(self, build, scratch):
         self._build = os.path.join(build, "bench")
+        stage = os.path.join(os.path.abspath(build), "stage")
+        self.library = os.path.join(stage, "lib", "libvclink_git.so")
+        self.tool = os.path.join(stage, "bin", "lnxhost", "vkAutoMerge.sh")
         self._scratch = scratch
         self._env = working_copies.environment(os.path.join(scratch, "home"))
 
@@ -41,14 +44,18 @@ class Programs:
         library = os.path.join(self._build, "libvclink_bench_allocations.so")
         return self.run(program, *arguments, env={**self._env, "LD_PRELOAD": library})
 
-    def clock(self, commands, rounds):
+    def clock(self, commands, rounds, before=lambda: None, added=None):
         """Runs all commands once a round, each second round backwards, after one round for the
-        system's caches. Gives the rounds: the times in the order of the commands."""
+        system's caches. Calls `before` before each, and adds to the environment. Gives the rounds:
+        the times in the order of the commands."""
+        env = {**self._env, **(added or {})}
         times = []
         for number in range(rounds + 1):
             order = list(enumerate(commands))
-            taken = {place: self.run(*command)["nanoseconds"]
-                     for place, command in (reversed(order) if number % 2 else order)}
+            taken = {}
+            for place, command in (reversed(order) if number % 2 else order):
+                before()
+                taken[place] = self.run(*command, env=env)["nanoseconds"]
             times.append([taken[place] for place in range(len(commands))])
         return times[1:]
 

@@ -70,5 +70,6 @@ void printRegion(size_t entries)
         printf("allocated_bytes %zu\n", counts->allocatedBytes);
         printf("held_bytes %lld\n",
                (long long)counts->allocatedBytes - (long long)counts->freedBytes);
+        printf("peak_bytes %zu\n", counts->peakBytes);
     }
 }

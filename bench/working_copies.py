@@ -41,10 +41,18 @@ def git(root, env, *arguments, **options):
     subprocess.run(["git", "-C", root, *arguments], env=env, check=True, **options)
 
 
+def make_repository(root, env):
+    """An empty repository."""
+    subprocess.run(["git", "init", "--quiet", "--initial-branch=main", root], env=env, check=True)
+    # libgit2 reads no identity from the environment.
+    for name, value in (("user.name", "bench"), ("user.email", "bench@localhost"), ("gc.auto", "0")):
+        git(root, env, "config", name, value)
+
+
 def make_working_copy(root, count, env):
     """A clean working copy. Its files are older than its index, so that a walk trusts the index's
     file times and reads no content."""
-    subprocess.run(["git", "init", "--quiet", "--initial-branch=main", root], env=env, check=True)
+    make_repository(root, env)
     git(root, env, "fast-import", "--quiet", input=b"".join(export_stream(count)))
     git(root, env, "read-tree", "HEAD")
     git(root, env, "checkout-index", "--all", "--force")
