@@ -1,0 +1,78 @@
+// SPDX-License-Identifier: MIT
+#include "servers.hpp"
+
+#include <array>
+#include <map>
+#include <memory>
+
+#include "GitDaemon.hpp"
+#include "SshServer.hpp"
+#include "WebServer.hpp"
+
+namespace vclink::test
+{
+namespace
+{
+
+std::unique_ptr<GitServer> start(Transport transport)
+{
+    switch (transport)
+    {
+    case Transport::path:
+        return std::make_unique<PathServer>();
+    case Transport::file:
+        return std::make_unique<FileServer>();
+    case Transport::git:
+        return std::make_unique<GitDaemon>();
+    case Transport::ssh:
+        return std::make_unique<SshServer>();
+    case Transport::http:
+        return std::make_unique<WebServer>(WebServer::Site::http);
+    case Transport::https:
+        return std::make_unique<WebServer>(WebServer::Site::https);
+    }
+    return nullptr;
+}
+
+std::map<Transport, std::unique_ptr<GitServer>> &runningServers()
+{
+    static std::map<Transport, std::unique_ptr<GitServer>> servers;
+    return servers;
+}
+
+GitServer &serverOf(Transport transport)
+{
+    auto &server = runningServers()[transport];
+    if (!server)
+        server = start(transport);
+    return *server;
+}
+
+} // namespace
+
+std::string nameOf(Transport transport)
+{
+    static const std::array<const char *, 6> names{"Path", "File", "Git", "Ssh", "Http", "Https"};
+    return names.at(static_cast<std::size_t>(transport));
+}
+
+void PrintTo(Transport transport, std::ostream *stream)
+{
+    *stream << nameOf(transport);
+}
+
+RunningServer::RunningServer() : server_(serverOf(GetParam()))
+{
+}
+
+void RunningServer::stopServers()
+{
+    runningServers().clear();
+}
+
+bool RunningServer::isLocal()
+{
+    return GetParam() == Transport::path || GetParam() == Transport::file;
+}
+
+} // namespace vclink::test

@@ -1,0 +1,52 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <ostream>
+#include <string>
+
+#include <gtest/gtest.h>
+
+#include "GitServer.hpp"
+#include "support/GitTest.hpp"
+
+namespace vclink::test
+{
+
+/// The ways to a repository.
+enum class Transport
+{
+    path,
+    file,
+    git,
+    ssh,
+    http,
+    https
+};
+
+std::string nameOf(Transport transport);
+void PrintTo(Transport transport, std::ostream *stream);
+
+/// Base of what runs once over each transport. The transport's server runs before the test's own
+/// environment is made, because it outlives the test; it is started for the first test that wants
+/// it, and ends with the suite.
+class RunningServer : public testing::WithParamInterface<Transport>
+{
+  public:
+    RunningServer();
+
+    /// Ends all servers that were started. To be called at the end of a suite.
+    static void stopServers();
+
+  protected:
+    GitServer &server() const noexcept
+    {
+        return server_;
+    }
+    /// Whether there is no server, and libgit2 works on the other repository itself.
+    static bool isLocal();
+
+  private:
+    GitServer &server_;
+};
+
+} // namespace vclink::test
