@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include <optional>
 #include <set>
 
 #include <sys/types.h>
@@ -11,7 +12,8 @@ namespace vclink::git
 /// Clears away at its end what Boost.Process leaves behind when a run does not come to its own end:
 /// of a command that can't be started, the writing end of its output pipe and the child that could
 /// not become the command; of a command that was killed, the child that nobody has waited for. To
-/// be made right before the start, and to end after the child's own object.
+/// be made right before the start, and to end after the child's own object. Children of the process
+/// that are none of its own are never waited for.
 class StartGuard
 {
   public:
@@ -39,7 +41,7 @@ class StartGuard
 
     int source_;
     int sink_;
-    std::set<pid_t> childrenBefore_;
+    std::optional<std::set<pid_t>> childrenBefore_;
     pid_t child_ = 0;
     bool ended_ = false;
 };

@@ -3,13 +3,17 @@
 #include <csignal>
 #include <cstdlib>
 #include <future>
+#include <optional>
 #include <thread>
+#include <vector>
 
 #include <fcntl.h>
 #include <gtest/gtest.h>
+#include <poll.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
+#include "DescriptorLimit.hpp"
 #include "NothingLeft.hpp"
 #include "util/StartGuard.hpp"
 
@@ -17,6 +21,7 @@ namespace
 {
 
 using vclink::git::StartGuard;
+using vclink::test::DescriptorLimit;
 using vclink::test::hasChildren;
 
 /// The two ends of a pipe, closed at the end unless they are closed already.
@@ -133,6 +138,66 @@ TEST_F(StartGuardTest, LeavesTheChildrenThatWereThereBefore)
     int status = 0;
     EXPECT_EQ(::waitpid(earlier, &status, WNOHANG), earlier);
     EXPECT_EQ(WEXITSTATUS(status), EXIT_FAILURE);
+}
+
+TEST_F(StartGuardTest, LeavesChildrenThatCouldNotBeListedBefore)
+{
+    const pid_t earlier = makeChild(EXIT_FAILURE);
+    awaitEnd(earlier);
+    const int reading = source();
+    const int writing = sink();
+    {
+        std::optional<DescriptorLimit> none(0);
+        const StartGuard guard(reading, writing);
+        none.reset();
+    }
+    EXPECT_EQ(::waitpid(earlier, nullptr, WNOHANG), earlier);
+}
+
+TEST_F(StartGuardTest, LeavesChildrenThatCannotBeListedAfterwards)
+{
+    pid_t child = 0;
+    std::optional<DescriptorLimit> none;
+    {
+        const StartGuard guard(source(), sink());
+        child = makeChild(EXIT_FAILURE);
+        none.emplace(0);
+    }
+    none.reset();
+    EXPECT_EQ(::waitpid(child, nullptr, 0), child);
+}
+
+TEST_F(StartGuardTest, WaitsForAChildThatTakesItsTimeToEnd)
+{
+    {
+        const StartGuard guard(source(), sink());
+        const pid_t child = ::fork();
+        if (child == 0)
+        {
+            ::poll(nullptr, 0, 20);
+            ::_exit(EXIT_FAILURE);
+        }
+    }
+    EXPECT_FALSE(hasChildren());
+}
+
+TEST_F(StartGuardTest, ListsAnyNumberOfChildren)
+{
+    std::vector<pid_t> earlier;
+    // Their list is longer than one reading of it.
+    for (int i = 0; i < 400; ++i)
+    {
+        earlier.push_back(makeChild(EXIT_FAILURE));
+        awaitEnd(earlier.back());
+    }
+    pid_t last = 0;
+    {
+        const StartGuard guard(source(), sink());
+        last = makeChild(EXIT_FAILURE);
+    }
+    EXPECT_EQ(::waitpid(last, nullptr, WNOHANG), -1);
+    for (const pid_t child : earlier)
+        EXPECT_EQ(::waitpid(child, nullptr, WNOHANG), child);
 }
 
 TEST_F(StartGuardTest, LeavesAChildThatEndsInAnotherWay)
