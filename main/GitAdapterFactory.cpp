@@ -3,9 +3,9 @@
 
 #include <utility>
 
-#include "error/notAvailable.hpp"
 #include "main/GitAdapter.hpp"
 #include "util/repository.hpp"
+#include "vclink/git/GitWorkingCopyGenerator.hpp"
 #include "vclink/git/LibGit2Guard.hpp"
 
 namespace vclink::git
@@ -23,10 +23,9 @@ GitAdapterFactory::createAdapterFor(const upath &root,
 }
 
 std::unique_ptr<WorkingCopyGenerator> GitAdapterFactory::createWorkingCopyGenerator(
-    std::shared_ptr<ApplicationInteractor> /*interactor*/) const
+    std::shared_ptr<ApplicationInteractor> interactor) const
 {
-    const LibGit2Guard guard;
-    raiseNotAvailable();
+    return std::make_unique<GitWorkingCopyGenerator>(std::move(interactor));
 }
 
 bool GitAdapterFactory::isAdapterFor(const upath &path) const

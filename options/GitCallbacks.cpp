@@ -43,11 +43,6 @@ class DefaultGitCallbacks : public GitCallbacks
 
 } // namespace
 
-RemoteCallbacks::RemoteCallbacks(ApplicationInteractor &interactor)
-    : interactor_(interactor), poller_(interactor)
-{
-}
-
 GitCallbacks::GitCallbacks(std::shared_ptr<ApplicationInteractor> interactor)
     : interactor_(std::move(interactor))
 {

@@ -1,11 +1,20 @@
 // SPDX-License-Identifier: MIT
 #include "options/gitRecords.hpp"
 
-#include "error/notAvailable.hpp"
 #include "options/Callbacks.hpp"
 
 namespace vclink::git
 {
+namespace
+{
+
+/// Puts the function that stands for a member function into a field of a record.
+template <auto MemberFunctionPointer, class Callback> void setCallback(Callback &field)
+{
+    field = makeCallback<MemberFunctionPointer, Callback>();
+}
+
+} // namespace
 
 git_proxy_options toGitProxyOptions(const ProxyOptions & /*options*/,
                                     ProxyCallbacks & /*callbacks*/)
@@ -35,24 +44,53 @@ git_checkout_options toGitCheckoutOptions(const CheckoutOptions &options,
     return record;
 }
 
-git_remote_callbacks toGitRemoteCallbacks(RemoteCallbacks & /*callbacks*/)
+git_remote_callbacks toGitRemoteCallbacks(RemoteCallbacks &callbacks)
 {
-    raiseNotAvailable();
+    git_remote_callbacks record =
+        initGitRecord(git_remote_init_callbacks, unsigned{GIT_REMOTE_CALLBACKS_VERSION});
+    record.payload = &callbacks;
+    setCallback<&RemoteCallbacks::sidebandProgress>(record.sideband_progress);
+    setCallback<&RemoteCallbacks::completion>(record.completion);
+    setCallback<&RemoteCallbacks::credentials>(record.credentials);
+    setCallback<&RemoteCallbacks::certificateCheck>(record.certificate_check);
+    setCallback<&RemoteCallbacks::transferProgress>(record.transfer_progress);
+    setCallback<&RemoteCallbacks::updateTips>(record.update_tips);
+    setCallback<&RemoteCallbacks::packProgress>(record.pack_progress);
+    setCallback<&RemoteCallbacks::pushTransferProgress>(record.push_transfer_progress);
+    setCallback<&RemoteCallbacks::pushUpdateReference>(record.push_update_reference);
+    setCallback<&RemoteCallbacks::pushNegotiation>(record.push_negotiation);
+    return record;
 }
 
-git_fetch_options toGitFetchOptions(const FetchOptions & /*options*/, GitCallbacks & /*callbacks*/)
+git_fetch_options toGitFetchOptions(const FetchOptions &options, GitCallbacks &callbacks)
 {
-    raiseNotAvailable();
+    git_fetch_options record =
+        initGitRecord(git_fetch_options_init, unsigned{GIT_FETCH_OPTIONS_VERSION});
+    record.proxy_opts = toGitProxyOptions(options.proxyOptions, callbacks.proxyCallbacks());
+    record.callbacks = toGitRemoteCallbacks(callbacks.remoteCallbacks());
+    return record;
 }
 
-git_push_options toGitPushOptions(const PushOptions & /*options*/, GitCallbacks & /*callbacks*/)
+git_push_options toGitPushOptions(const PushOptions &options, GitCallbacks &callbacks)
 {
-    raiseNotAvailable();
+    git_push_options record =
+        initGitRecord(git_push_options_init, unsigned{GIT_PUSH_OPTIONS_VERSION});
+    record.pb_parallelism = options.packbuilderParallelism;
+    record.callbacks = toGitRemoteCallbacks(callbacks.remoteCallbacks());
+    record.proxy_opts = toGitProxyOptions(options.proxyOptions, callbacks.proxyCallbacks());
+    return record;
 }
 
-git_clone_options toGitCloneOptions(const CloneOptions & /*options*/, GitCallbacks & /*callbacks*/)
+git_clone_options toGitCloneOptions(const CloneOptions &options, GitCallbacks &callbacks)
 {
-    raiseNotAvailable();
+    git_clone_options record =
+        initGitRecord(git_clone_options_init, unsigned{GIT_CLONE_OPTIONS_VERSION});
+    record.bare = options.bare ? 1 : 0;
+    record.checkout_branch = options.checkoutBranch ? options.checkoutBranch->c_str() : nullptr;
+    record.checkout_opts =
+        toGitCheckoutOptions(options.checkoutOptions, callbacks.checkoutCallbacks());
+    record.fetch_opts = toGitFetchOptions(options.fetchOptions, callbacks);
+    return record;
 }
 
 } // namespace vclink::git

@@ -44,9 +44,22 @@ git_merge_options toGitMergeOptions(const MergeOptions &options);
 /// paths is the caller's to fill in.
 git_checkout_options toGitCheckoutOptions(const CheckoutOptions &options,
                                           CheckoutCallbacks &callbacks);
+
+/// git_remote_init_callbacks. All ten callbacks of RemoteCallbacks, with `callbacks` as their
+/// payload; the rest stays as libgit2 initialised it.
 git_remote_callbacks toGitRemoteCallbacks(RemoteCallbacks &callbacks);
+
+/// git_fetch_options_init. The proxy record and the remote callbacks; the rest stays as libgit2
+/// initialised it: tags come along with what they point at, nothing is pruned.
 git_fetch_options toGitFetchOptions(const FetchOptions &options, GitCallbacks &callbacks);
+
+/// git_push_options_init. The number of threads, the remote callbacks and the proxy record; the
+/// rest stays as libgit2 initialised it.
 git_push_options toGitPushOptions(const PushOptions &options, GitCallbacks &callbacks);
+
+/// git_clone_options_init. What `options` says, with the records of its checkout and of its fetch;
+/// the rest stays as libgit2 initialised it.
+/// @param options the record points at its branch name, where it has one
 git_clone_options toGitCloneOptions(const CloneOptions &options, GitCallbacks &callbacks);
 
 } // namespace vclink::git

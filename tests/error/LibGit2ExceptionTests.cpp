@@ -10,7 +10,6 @@
 #include <gtest/gtest.h>
 
 #include "error/HermeticLibGit2.hpp"
-#include "error/notAvailable.hpp"
 #include "fl/i18n/convert.hpp"
 #include "vclink/git/messageIdentifiers.hpp"
 
@@ -100,20 +99,6 @@ TEST(LibGit2Exception, RethrowsACopyOfItself)
         expectFailure(dynamic_cast<const LibGit2Exception &>(copy), -13, GIT_ERROR_CHECKOUT,
                       u"1 conflict");
         EXPECT_EQ(copy.getStackTrace().to_text(), original.getStackTrace().to_text());
-    }
-}
-
-TEST(NotAvailable, IsAFailureOfLibGit2)
-{
-    const HermeticLibGit2 libgit2;
-    try
-    {
-        raiseNotAvailable();
-    }
-    catch (const LibGit2Exception &exception)
-    {
-        EXPECT_EQ(exception.getError().getCode(), GIT_ERROR);
-        EXPECT_EQ(exception.getError().getMessage(), u"not available in this build");
     }
 }
 

@@ -2,7 +2,6 @@
 #include "options/gitRecords.hpp"
 
 #include <cstring>
-#include <functional>
 #include <memory>
 #include <vector>
 
@@ -114,32 +113,6 @@ TEST(ToGitMergeOptions, GivesTheRecordThatLibGit2Makes)
     const git_merge_options record = toGitMergeOptions(MergeOptions());
     EXPECT_EQ(bytesOf(record), bytesOf(expected));
     EXPECT_EQ(record.version, 1u);
-}
-
-void expectNotAvailable(const std::function<void(GitCallbacks &)> &convert)
-{
-    const HermeticLibGit2 libgit2;
-    const auto callbacks = makeDefaultGitCallbacks(std::make_shared<TestInteractor>());
-    try
-    {
-        convert(*callbacks);
-        ADD_FAILURE() << "nothing was raised";
-    }
-    catch (const LibGit2Exception &exception)
-    {
-        EXPECT_EQ(exception.getError().getMessage(), u"not available in this build");
-    }
-}
-
-TEST(GitRecords, ThatThisBuildDoesNotMakeSaySo)
-{
-    expectNotAvailable([](GitCallbacks &callbacks)
-                       { toGitRemoteCallbacks(callbacks.remoteCallbacks()); });
-    expectNotAvailable([](GitCallbacks &callbacks)
-                       { toGitFetchOptions(FetchOptions(), callbacks); });
-    expectNotAvailable([](GitCallbacks &callbacks) { toGitPushOptions(PushOptions(), callbacks); });
-    expectNotAvailable([](GitCallbacks &callbacks)
-                       { toGitCloneOptions(CloneOptions(), callbacks); });
 }
 
 } // namespace

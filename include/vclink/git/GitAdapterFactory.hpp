@@ -83,7 +83,9 @@ class VCLINK_GIT_EXPORT GitAdapterFactory : public vclink::CMAdapterFactory
     createAdapterFor(const upath &root,
                      std::shared_ptr<ApplicationInteractor> interactor) const override;
 
-    /// @throws LibGit2Exception: not available in this build
+    /// A GitWorkingCopyGenerator, which the host owns. Nothing is opened.
+    /// @param interactor not null; shared for the generator's life
+    /// @throws std::bad_alloc
     std::unique_ptr<WorkingCopyGenerator>
     createWorkingCopyGenerator(std::shared_ptr<ApplicationInteractor> interactor) const override;
 

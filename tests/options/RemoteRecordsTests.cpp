@@ -1,0 +1,393 @@
+// SPDX-License-Identifier: MIT
+#include <algorithm>
+#include <cstring>
+#include <functional>
+#include <memory>
+#include <stdexcept>
+#include <string>
+#include <vector>
+
+#include <dlfcn.h>
+#include <git2.h>
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include "error/CoreFilter.hpp"
+#include "error/HermeticLibGit2.hpp"
+#include "error/errorUtil/callbackException.hpp"
+#include "error/logging/severity.hpp"
+#include "options/gitRecords.hpp"
+#include "support/LogCapture.hpp"
+#include "support/TestInteractor.hpp"
+#include "vclink/git/GitOptionsFactory.hpp"
+#include "vclink/git/LibGit2Exception.hpp"
+#include "vclink/util/exception/CancelledOperationException.hpp"
+
+namespace
+{
+
+/// The init functions that were called, in order.
+std::vector<std::string> inits;
+/// The records that were not zeroed, or of another version than 1, by the init function's name.
+std::vector<std::string> unfit;
+/// The init function that fails.
+std::string failing;
+
+template <class Record> int init(const char *name, Record *record, unsigned version)
+{
+    inits.emplace_back(name);
+    const auto *const bytes = reinterpret_cast<const unsigned char *>(record);
+    const bool isZeroed =
+        std::all_of(bytes, bytes + sizeof(*record), [](unsigned char byte) { return byte == 0; });
+    if (!isZeroed || version != 1)
+        unfit.emplace_back(name);
+    if (failing == name)
+    {
+        git_error_set_str(GIT_ERROR_INVALID, "invalid version");
+        return -1;
+    }
+    void *const symbol = dlsym(RTLD_NEXT, name);
+    int (*real)(Record *, unsigned) = nullptr;
+    static_assert(sizeof(real) == sizeof(symbol));
+    std::memcpy(&real, &symbol, sizeof(real));
+    return real(record, version);
+}
+
+} // namespace
+
+// This program's own definitions go before libgit2's.
+int git_remote_init_callbacks(git_remote_callbacks *record, unsigned version)
+{
+    return init("git_remote_init_callbacks", record, version);
+}
+int git_proxy_options_init(git_proxy_options *record, unsigned version)
+{
+    return init("git_proxy_options_init", record, version);
+}
+int git_checkout_options_init(git_checkout_options *record, unsigned version)
+{
+    return init("git_checkout_options_init", record, version);
+}
+int git_fetch_options_init(git_fetch_options *record, unsigned version)
+{
+    return init("git_fetch_options_init", record, version);
+}
+int git_push_options_init(git_push_options *record, unsigned version)
+{
+    return init("git_push_options_init", record, version);
+}
+int git_clone_options_init(git_clone_options *record, unsigned version)
+{
+    return init("git_clone_options_init", record, version);
+}
+
+namespace vclink::git
+{
+namespace
+{
+
+using test::LogCapture;
+using testing::ElementsAre;
+using testing::HasSubstr;
+using testing::IsEmpty;
+using testing::StartsWith;
+using vclink::util::exception::CancelledOperationException;
+
+template <class Record> std::vector<unsigned char> bytesOf(const Record &record)
+{
+    std::vector<unsigned char> bytes(sizeof(record));
+    std::memcpy(bytes.data(), &record, sizeof(record));
+    return bytes;
+}
+
+/// The record as libgit2 makes it.
+template <class Record> Record initialised(int (*function)(Record *, unsigned))
+{
+    Record record;
+    std::memset(&record, 0, sizeof(record));
+    EXPECT_EQ(function(&record, 1), 0);
+    inits.clear();
+    return record;
+}
+
+class RemoteRecords : public testing::Test
+{
+  protected:
+    RemoteRecords()
+    {
+        inits.clear();
+        unfit.clear();
+        failing.clear();
+        pendingCallbackException() = nullptr;
+    }
+    ~RemoteRecords() override
+    {
+        EXPECT_THAT(unfit, IsEmpty()) << "a record was not zeroed, or of another version";
+        failing.clear();
+        pendingCallbackException() = nullptr;
+    }
+
+    git_remote_callbacks remoteRecord()
+    {
+        return toGitRemoteCallbacks(callbacks_->remoteCallbacks());
+    }
+    git_proxy_options proxyRecord()
+    {
+        return toGitProxyOptions(ProxyOptions(), callbacks_->proxyCallbacks());
+    }
+    /// Calls all ten functions of the record.
+    static void callAll(const git_remote_callbacks &record)
+    {
+        void *const set = record.payload;
+        const git_indexer_progress stats = {};
+        git_credential *credential = nullptr;
+        EXPECT_EQ(record.sideband_progress("hello", 5, set), 0);
+        EXPECT_EQ(record.completion(GIT_REMOTE_COMPLETION_INDEXING, set), 0);
+        EXPECT_EQ(record.credentials(&credential, "url", "user", 1, set), -1);
+        EXPECT_EQ(record.certificate_check(nullptr, 1, "host", set), 1);
+        EXPECT_EQ(record.transfer_progress(&stats, set), 0);
+        EXPECT_EQ(record.update_tips("tip", nullptr, nullptr, set), 0);
+        EXPECT_EQ(record.pack_progress(1, 2, 3, set), 0);
+        EXPECT_EQ(record.push_transfer_progress(4, 5, 6, set), 0);
+        EXPECT_EQ(record.push_update_reference("name", "no", set), 0);
+        EXPECT_EQ(record.push_negotiation(nullptr, 7, set), 0);
+    }
+    /// Every init function that `convert` calls, made to fail, fails it.
+    void expectEachInitToRaise(const std::function<void()> &convert) const
+    {
+        const test::HermeticLibGit2 libgit2;
+        convert();
+        const std::vector<std::string> called = inits;
+        for (const auto &name : called)
+        {
+            failing = name;
+            try
+            {
+                convert();
+                ADD_FAILURE() << name;
+            }
+            catch (const LibGit2Exception &exception)
+            {
+                EXPECT_EQ(exception.getError().getCode(), -1);
+                EXPECT_EQ(exception.getError().getErrorClass(), GIT_ERROR_INVALID);
+                EXPECT_EQ(exception.getError().getMessage(), u"invalid version");
+            }
+        }
+    }
+
+    const std::shared_ptr<test::TestInteractor> interactor_ =
+        std::make_shared<test::TestInteractor>();
+    const std::unique_ptr<GitCallbacks> callbacks_ = makeDefaultGitCallbacks(interactor_);
+};
+
+using ToGitRemoteCallbacks = RemoteRecords;
+using ToGitFetchOptions = RemoteRecords;
+using ToGitPushOptions = RemoteRecords;
+using ToGitCloneOptions = RemoteRecords;
+
+TEST_F(ToGitRemoteCallbacks, SetsTheseFieldsAndLeavesTheOthersAsLibGit2MadeThem)
+{
+    git_remote_callbacks expected = initialised(git_remote_init_callbacks);
+    const git_remote_callbacks record = remoteRecord();
+    expected.sideband_progress = record.sideband_progress;
+    expected.completion = record.completion;
+    expected.credentials = record.credentials;
+    expected.certificate_check = record.certificate_check;
+    expected.transfer_progress = record.transfer_progress;
+    expected.update_tips = record.update_tips;
+    expected.pack_progress = record.pack_progress;
+    expected.push_transfer_progress = record.push_transfer_progress;
+    expected.push_update_reference = record.push_update_reference;
+    expected.push_negotiation = record.push_negotiation;
+    expected.payload = &callbacks_->remoteCallbacks();
+    EXPECT_EQ(bytesOf(record), bytesOf(expected));
+    EXPECT_EQ(record.version, 1u);
+    EXPECT_EQ(record.transport, nullptr);
+    EXPECT_EQ(record.resolve_url, nullptr);
+}
+
+TEST_F(ToGitRemoteCallbacks, WiresEachOfTheTenToItsMember)
+{
+    const git_remote_callbacks record = remoteRecord();
+    const LogCapture log(SeverityProgress | SeverityParameter);
+    callAll(record);
+    EXPECT_THAT(log.messages(),
+                ElementsAre(" msgStr=hello", " type=1",
+                            " url=url username_from_url=user allowed_types=1", " valid=1 host=host",
+                            "Transfer Progress (Objects / Bytes): 00", " ref=tip",
+                            " stage=1 current=2 total=3", " current=4 total=5 bytes=6",
+                            " refnameStr=name statusStr=no", " len=7"));
+}
+
+TEST_F(ToGitRemoteCallbacks, TracesEachOfTheTenUnderItsOwnName)
+{
+    const git_remote_callbacks record = remoteRecord();
+    const LogCapture log(SeverityScopeEntry);
+    callAll(record);
+#ifdef __clang__
+    // It names the callback's arguments only.
+    EXPECT_EQ(log.messages().size(), 10u);
+#else
+    EXPECT_THAT(log.messages(), ElementsAre(HasSubstr("RemoteCallbacks::sidebandProgress"),
+                                            HasSubstr("RemoteCallbacks::completion"),
+                                            HasSubstr("RemoteCallbacks::credentials"),
+                                            HasSubstr("RemoteCallbacks::certificateCheck"),
+                                            HasSubstr("RemoteCallbacks::transferProgress"),
+                                            HasSubstr("RemoteCallbacks::updateTips"),
+                                            HasSubstr("RemoteCallbacks::packProgress"),
+                                            HasSubstr("RemoteCallbacks::pushTransferProgress"),
+                                            HasSubstr("RemoteCallbacks::pushUpdateReference"),
+                                            HasSubstr("RemoteCallbacks::pushNegotiation")));
+#endif
+}
+
+TEST_F(ToGitRemoteCallbacks, ParksACancellationOfEitherPollPoint)
+{
+    const git_remote_callbacks record = remoteRecord();
+    const git_indexer_progress stats = {};
+    for (const auto &poll :
+         std::vector<std::function<int()>>{
+             [&] { return record.sideband_progress("", 0, record.payload); },
+             [&] { return record.transfer_progress(&stats, record.payload); }})
+    {
+        interactor_->cancel();
+        const LogCapture log(SeverityException);
+        EXPECT_EQ(poll(), GIT_EUSER);
+        EXPECT_THAT(log.messages(), ElementsAre(StartsWith("Exception caught: ")));
+        ASSERT_NE(pendingCallbackException(), nullptr);
+        EXPECT_THROW(std::rethrow_exception(pendingCallbackException()),
+                     CancelledOperationException);
+        pendingCallbackException() = nullptr;
+        EXPECT_EQ(poll(), 0) << "the request is still there";
+    }
+}
+
+TEST_F(ToGitRemoteCallbacks, ParksWhatTheLogRaises)
+{
+    const git_remote_callbacks record = remoteRecord();
+    const LogCapture log(SeverityParameter);
+    const test::CoreFilter filter([](unsigned) -> bool { throw std::runtime_error("no disk"); });
+    EXPECT_EQ(record.completion(GIT_REMOTE_COMPLETION_DOWNLOAD, record.payload), GIT_EUSER);
+    EXPECT_EQ(record.certificate_check(nullptr, 1, "host", record.payload), GIT_EUSER);
+    ASSERT_NE(pendingCallbackException(), nullptr);
+    EXPECT_THROW(std::rethrow_exception(pendingCallbackException()), std::runtime_error);
+}
+
+TEST_F(ToGitRemoteCallbacks, RaisesTheFailureOfLibGit2)
+{
+    expectEachInitToRaise([this] { remoteRecord(); });
+}
+
+TEST_F(ToGitFetchOptions, SetsTheProxyAndThenTheCallbacks)
+{
+    git_fetch_options expected = initialised(git_fetch_options_init);
+    expected.proxy_opts = proxyRecord();
+    expected.callbacks = remoteRecord();
+    inits.clear();
+    EXPECT_EQ(bytesOf(toGitFetchOptions(FetchOptions(), *callbacks_)), bytesOf(expected));
+    EXPECT_THAT(inits, ElementsAre("git_fetch_options_init", "git_proxy_options_init",
+                                   "git_remote_init_callbacks"));
+}
+
+TEST_F(ToGitFetchOptions, LeavesTagsAndPruningToTheConfiguration)
+{
+    const git_fetch_options record = toGitFetchOptions(FetchOptions(), *callbacks_);
+    const git_fetch_options expected = initialised(git_fetch_options_init);
+    EXPECT_EQ(record.prune, expected.prune);
+    EXPECT_EQ(record.update_fetchhead, expected.update_fetchhead);
+    EXPECT_EQ(record.download_tags, expected.download_tags);
+    EXPECT_EQ(record.custom_headers.count, 0u);
+}
+
+TEST_F(ToGitFetchOptions, RaisesTheFailureOfLibGit2)
+{
+    expectEachInitToRaise([this] { toGitFetchOptions(FetchOptions(), *callbacks_); });
+    EXPECT_EQ(inits.size(), 3u + 1 + 2 + 3);
+}
+
+TEST_F(ToGitPushOptions, SetsTheThreadsThenTheCallbacksAndTheProxy)
+{
+    git_push_options expected = initialised(git_push_options_init);
+    expected.callbacks = remoteRecord();
+    expected.proxy_opts = proxyRecord();
+    inits.clear();
+    PushOptions options;
+    for (const unsigned threads : {1u, 0u, 3u, 0xFFFFFFFFu})
+    {
+        options.packbuilderParallelism = threads;
+        expected.pb_parallelism = threads;
+        inits.clear();
+        EXPECT_EQ(bytesOf(toGitPushOptions(options, *callbacks_)), bytesOf(expected));
+        EXPECT_THAT(inits, ElementsAre("git_push_options_init", "git_remote_init_callbacks",
+                                       "git_proxy_options_init"));
+    }
+    EXPECT_EQ(toGitPushOptions(PushOptions(), *callbacks_).pb_parallelism, 1u);
+}
+
+TEST_F(ToGitPushOptions, RaisesTheFailureOfLibGit2)
+{
+    expectEachInitToRaise([this] { toGitPushOptions(PushOptions(), *callbacks_); });
+    EXPECT_EQ(inits.size(), 3u + 1 + 2 + 3);
+}
+
+TEST_F(ToGitCloneOptions, SetsTheRecordsOfTheCheckoutAndOfTheFetch)
+{
+    git_clone_options expected = initialised(git_clone_options_init);
+    CloneOptions options;
+    options.checkoutOptions.checkoutStrategy = 0x12;
+    expected.checkout_opts =
+        toGitCheckoutOptions(options.checkoutOptions, callbacks_->checkoutCallbacks());
+    expected.fetch_opts = toGitFetchOptions(options.fetchOptions, *callbacks_);
+    inits.clear();
+    EXPECT_EQ(bytesOf(toGitCloneOptions(options, *callbacks_)), bytesOf(expected));
+    EXPECT_THAT(inits, ElementsAre("git_clone_options_init", "git_checkout_options_init",
+                                   "git_fetch_options_init", "git_proxy_options_init",
+                                   "git_remote_init_callbacks"));
+}
+
+TEST_F(ToGitCloneOptions, OfTheFactoryAreASafeCloneWithAWorkingTree)
+{
+    const auto factory = GitOptionsFactory::makeDefault(interactor_);
+    const git_clone_options record = toGitCloneOptions(factory->makeCloneOptions(), *callbacks_);
+    const git_clone_options expected = initialised(git_clone_options_init);
+    EXPECT_EQ(record.bare, 0);
+    EXPECT_EQ(record.checkout_branch, nullptr);
+    EXPECT_EQ(record.local, expected.local);
+    EXPECT_EQ(record.checkout_opts.checkout_strategy, unsigned{GIT_CHECKOUT_SAFE});
+}
+
+TEST_F(ToGitCloneOptions, TakesWhetherToBeBare)
+{
+    CloneOptions options;
+    options.bare = true;
+    EXPECT_EQ(toGitCloneOptions(options, *callbacks_).bare, 1);
+}
+
+TEST_F(ToGitCloneOptions, PointsAtTheBranchOfItsOptions)
+{
+    CloneOptions options;
+    EXPECT_EQ(toGitCloneOptions(options, *callbacks_).checkout_branch, nullptr);
+    options.checkoutBranch = "feature/gr\xC3\xBC\xC3\x9F";
+    const git_clone_options record = toGitCloneOptions(options, *callbacks_);
+    EXPECT_EQ(record.checkout_branch, options.checkoutBranch->c_str());
+    EXPECT_STREQ(record.checkout_branch, "feature/gr\xC3\xBC\xC3\x9F");
+}
+
+/// It is the caller's who keeps the options for as long as the record.
+TEST_F(ToGitCloneOptions, KeepsNoBranchOfItsOwn)
+{
+    CloneOptions options;
+    options.checkoutBranch = "main";
+    const git_clone_options record = toGitCloneOptions(options, *callbacks_);
+    options.checkoutBranch->front() = 'p';
+    EXPECT_STREQ(record.checkout_branch, "pain");
+}
+
+TEST_F(ToGitCloneOptions, RaisesTheFailureOfLibGit2)
+{
+    expectEachInitToRaise([this] { toGitCloneOptions(CloneOptions(), *callbacks_); });
+    EXPECT_EQ(inits.size(), 5u + 1 + 2 + 3 + 4 + 5);
+}
+
+} // namespace
+} // namespace vclink::git
