@@ -50,14 +50,9 @@ LinkGuard::~LinkGuard()
 {
     for (const auto &[path, target] : removed_)
     {
-        // Fails where something has come into its place, which stays.
+        // Fails where something has come into its place, which stays: after a checkout, everywhere.
         static_cast<void>(::symlink(target.c_str(), path.c_str()) == 0);
     }
-}
-
-void LinkGuard::hasSucceeded() noexcept
-{
-    removed_.clear();
 }
 
 int LinkGuard::notify(git_checkout_notify_t why, const char *path, const git_diff_file *baseline,
@@ -103,7 +98,6 @@ void LinkGuard::removeLink(const std::string &path)
     if (::unlink(path.c_str()) != 0)
     {
         const int error = errno;
-        removed_.pop_back();
         raiseSystemError(error, "could not remove the link '" + path + "'");
     }
 }

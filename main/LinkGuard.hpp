@@ -16,8 +16,8 @@ namespace vclink::git
 /// this.
 ///
 /// Hears of each file before the first is written, through the record's notifications, which go on
-/// to the callback that the record had. A checkout that fails, or is cancelled, gets the links back
-/// where nothing has come into their place.
+/// to the callback that the record had. At its end it puts the links back into whose place nothing
+/// has come, which are those of a checkout that failed or was cancelled.
 class LinkGuard
 {
   public:
@@ -26,9 +26,6 @@ class LinkGuard
     LinkGuard(const LinkGuard &) = delete;
     LinkGuard &operator=(const LinkGuard &) = delete;
     ~LinkGuard();
-
-    /// To be called after the checkout: its links stay away.
-    void hasSucceeded() noexcept;
 
   private:
     static int notify(git_checkout_notify_t why, const char *path, const git_diff_file *baseline,

@@ -110,7 +110,6 @@ void GitAdapter::revertFiles(const std::vector<upath> &files)
     record.paths = getArray(pathspec);
     LinkGuard links(repository.get(), record);
     makeResult(git_checkout_index(repository.get(), nullptr, &record)).value();
-    links.hasSucceeded();
 }
 
 } // namespace vclink::git

@@ -101,7 +101,6 @@ void BranchMerger::threeWayMerge(const BranchName &name, git_repository *reposit
     const git_annotated_commit *heads[] = {theirs};
     LinkGuard links(repository, checkoutRecord);
     makeResult(git_merge(repository, heads, 1, &mergeRecord, &checkoutRecord)).value();
-    links.hasSucceeded();
     const OwnedHandle<git_index> index = getRepositoryIndex(repository);
     if (git_index_has_conflicts(index.get()) != 0)
     {
