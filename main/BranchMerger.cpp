@@ -16,6 +16,7 @@
 #include "error/errorUtil/rethrowAsGitException.hpp"
 #include "error/logging/logger.hpp"
 #include "error/raise.hpp"
+#include "main/SafeLinkGuard.hpp"
 #include "options/gitRecords.hpp"
 #include "util/repository.hpp"
 #include "vclink/git/messageIdentifiers.hpp"
@@ -108,8 +109,8 @@ void BranchMerger::fastForward(git_repository *repository, git_annotated_commit 
         acquire<git_object>(git_object_lookup, repository, id, GIT_OBJECT_COMMIT).value();
     CheckoutOptions options = optionsFactory_->makeCheckoutOptions();
     options.checkoutStrategy = GIT_CHECKOUT_SAFE;
-    const git_checkout_options record =
-        toGitCheckoutOptions(options, callbacks_->checkoutCallbacks());
+    git_checkout_options record = toGitCheckoutOptions(options, callbacks_->checkoutCallbacks());
+    const SafeLinkGuard links(repository, target.get(), record);
     makeResult(git_checkout_tree(repository, target.get(), &record)).value();
     // Only now, so that a checkout that fails leaves the branch where it was.
     acquire<git_reference>(git_reference_set_target, head.get(), id, nullptr).value();

@@ -1,0 +1,96 @@
+// SPDX-License-Identifier: MIT
+#include "main/SafeLinkGuard.hpp"
+
+#include <fcntl.h>
+#include <git2/diff.h>
+#include <git2/errors.h>
+#include <git2/object.h>
+#include <git2/oid.h>
+#include <sys/stat.h>
+
+#include "error/errorUtil/callbackException.hpp"
+#include "util/repository.hpp"
+
+namespace vclink::git
+{
+namespace
+{
+
+bool isFolder(const GitResult<OwnedHandle<git_object>> &object)
+{
+    return object.has_value() && git_object_type(object.value().get()) == GIT_OBJECT_TREE;
+}
+
+/// An ignored link where a new file belongs is overwritten, which means what it leads to.
+bool isWrittenThrough(git_checkout_notify_t why, const git_diff_file *baseline,
+                      const git_diff_file *target)
+{
+    return why == GIT_CHECKOUT_NOTIFY_UPDATED && baseline == nullptr && target != nullptr &&
+           S_ISREG(target->mode);
+}
+
+int refuse(const std::string &name)
+{
+    const std::string text = "the symbolic link '" + name + "' is in the way of the checkout";
+    git_error_set_str(GIT_ERROR_CHECKOUT, text.c_str());
+    return GIT_ECONFLICT;
+}
+
+} // namespace
+
+SafeLinkGuard::SafeLinkGuard(git_repository *repository, const git_object *target,
+                             git_checkout_options &record)
+    : repository_(repository), target_(git_oid_tostr_s(git_object_id(target))),
+      next_(record.notify_cb), nextPayload_(record.notify_payload)
+{
+    record.notify_cb = notify;
+    record.notify_payload = this;
+    // A link that comes later must not be written through either.
+    record.file_open_flags = O_CREAT | O_TRUNC | O_WRONLY | O_NOFOLLOW;
+}
+
+int SafeLinkGuard::notify(git_checkout_notify_t why, const char *path,
+                          const git_diff_file *baseline, const git_diff_file *target,
+                          const git_diff_file *workdir, void *payload) noexcept
+{
+    const auto &guard = *static_cast<SafeLinkGuard *>(payload);
+    const int code = guard.next_(why, path, baseline, target, workdir, guard.nextPayload_);
+    // libgit2 refuses what is a conflict to it by itself.
+    if (code != 0 || why == GIT_CHECKOUT_NOTIFY_CONFLICT || workdir == nullptr ||
+        !S_ISLNK(workdir->mode))
+    {
+        return code;
+    }
+    try
+    {
+        // The link's own name: the path may be that of a file below it.
+        const std::string name = workdir->path;
+        const bool isInTheWay =
+            isWrittenThrough(why, baseline, target) || guard.isChangedFolder(name);
+        return isInTheWay ? refuse(name) : 0;
+    }
+    catch (...)
+    {
+        return parkCallbackException();
+    }
+}
+
+/// Whether there is a folder of this name that the checkout makes, changes or takes away. A file or
+/// link of this name is none of it: where HEAD has one, libgit2 sees that it is unchanged.
+bool SafeLinkGuard::isChangedFolder(const std::string &name) const
+{
+    const auto before = revparseObject(repository_, "HEAD:" + name);
+    const auto after = revparseObject(repository_, target_ + ':' + name);
+    if (before.has_value() && !isFolder(before))
+    {
+        return false;
+    }
+    if (!isFolder(before) || !isFolder(after))
+    {
+        return isFolder(before) || isFolder(after);
+    }
+    return git_oid_equal(git_object_id(before.value().get()), git_object_id(after.value().get())) ==
+           0;
+}
+
+} // namespace vclink::git

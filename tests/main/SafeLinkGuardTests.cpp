@@ -1,0 +1,209 @@
+// SPDX-License-Identifier: MIT
+#include <filesystem>
+#include <memory>
+#include <string>
+
+#include <git2.h>
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include "SwitchBranchTest.hpp"
+#include "support/text.hpp"
+#include "vclink/util/exception/CancelledOperationException.hpp"
+
+namespace
+{
+
+namespace fs = std::filesystem;
+using testing::ElementsAre;
+using testing::HasSubstr;
+using testing::IsEmpty;
+using vclink::test::LibGit2Failure;
+using vclink::test::NothingChanges;
+using vclink::test::stateOf;
+using vclink::util::exception::CancelledOperationException;
+
+/// "main" with the folder "dir", of which the test makes a link to a folder outside that holds the
+/// same names, and branches that change it.
+class SafeLinkGuard : public vclink::test::SwitchBranchTest
+{
+  protected:
+    SafeLinkGuard()
+    {
+        for (const auto *name : {"dir/a", "dir/b", "dir/deep/c"})
+        {
+            repository_.write(name, "of main\n");
+            repository_.write(std::string("../outside/") + name, "precious\n");
+        }
+        repository_.commitAll("second");
+        makeBranch("adds", [this] { repository_.write("dir/new", "x"); });
+        makeBranch("edits", [this] { repository_.write("dir/b", "of the branch\n"); });
+        makeBranch("drops", [this] { repository_.remove("dir/b"); });
+        makeBranch("drops all", [this] { repository_.remove("dir"); });
+        makeBranch("elsewhere", [this] { repository_.write("new", "x"); });
+    }
+
+    template <class Change> void makeBranch(const std::string &name, Change change)
+    {
+        std::string branch = name;
+        for (char &character : branch)
+            character = character == ' ' ? '-' : character;
+        repository_.git({"checkout", "--quiet", "-b", branch, "main"});
+        change();
+        repository_.commitAll(name);
+        repository_.git({"checkout", "--quiet", "main"});
+    }
+    void linkFolder()
+    {
+        repository_.remove("dir");
+        repository_.symlink("../outside/dir", "dir");
+    }
+    static LibGit2Failure inTheWay(const std::string &name)
+    {
+        return {GIT_ECONFLICT, GIT_ERROR_CHECKOUT,
+                "the symbolic link '" + name + "' is in the way of the checkout"};
+    }
+    void expectNothingOutsideChanged() const
+    {
+        for (const auto *name : {"dir/a", "dir/b", "dir/deep/c"})
+            EXPECT_EQ(repository_.read(std::string("../outside/") + name), "precious\n");
+        EXPECT_FALSE(fs::exists(folder() / "outside/dir/new"));
+    }
+};
+
+TEST_F(SafeLinkGuard, RefusesToGoThroughALinkThatStandsForAFolder)
+{
+    linkFolder();
+    for (const auto *branch : {"adds", "edits", "drops"})
+    {
+        SCOPED_TRACE(branch);
+        const NothingChanges nothing(repository_);
+        const auto failure = vclink::test::libGit2FailureOf([&] { switchTo(branch); });
+        EXPECT_EQ(failure.code, GIT_ECONFLICT);
+        expectNothingOutsideChanged();
+    }
+    expectRefused("adds", inTheWay("dir"));
+    EXPECT_FALSE(repository_.tryGit({"checkout", "adds"}).succeeded());
+}
+
+TEST_F(SafeLinkGuard, RefusesToTakeAFolderAwayThroughALink)
+{
+    linkFolder();
+    const NothingChanges nothing(repository_);
+    vclink::test::libGit2FailureOf([this] { switchTo("drops-all"); });
+    expectNothingOutsideChanged();
+}
+
+TEST_F(SafeLinkGuard, RefusesALinkThatLeadsToAnotherFolderOfTheWorkingCopy)
+{
+    repository_.write("copy/b", "precious\n");
+    repository_.remove("dir");
+    repository_.symlink("copy", "dir");
+    expectRefused("drops", inTheWay("dir"));
+}
+
+TEST_F(SafeLinkGuard, RefusesALinkThatIsDeeperDown)
+{
+    makeBranch("deep", [this] { repository_.write("dir/deep/new", "x"); });
+    repository_.remove("dir/deep");
+    repository_.symlink("../../outside/dir/deep", "dir/deep");
+    expectRefused("deep", inTheWay("dir/deep"));
+    EXPECT_FALSE(fs::exists(folder() / "outside/dir/deep/new"));
+}
+
+/// libgit2 comes to the link before it comes to "new-b", and forgets of it before "new/file".
+TEST_F(SafeLinkGuard, RefusesALinkThatStandsForAFolderOfTheBranch)
+{
+    repository_.write("new-b", "x");
+    repository_.commitAll("third");
+    makeBranch("makes", [this] { repository_.write("new/file", "x"); });
+    repository_.symlink("../outside", "new");
+    expectRefused("makes", inTheWay("new"));
+    EXPECT_FALSE(fs::exists(folder() / "outside/file"));
+}
+
+TEST_F(SafeLinkGuard, RefusesALinkThatIsStaged)
+{
+    linkFolder();
+    repository_.add({"dir"});
+    const NothingChanges nothing(repository_);
+    vclink::test::libGit2FailureOf([this] { switchTo("adds"); });
+    expectNothingOutsideChanged();
+}
+
+TEST_F(SafeLinkGuard, RefusesALinkThatIsIgnored)
+{
+    repository_.write(".git/info/exclude", "dir\nnew\n");
+    linkFolder();
+    expectRefused("adds", inTheWay("dir"));
+    expectNothingOutsideChanged();
+    repository_.symlink("../outside/dir/a", "new");
+    expectRefused("elsewhere", inTheWay("new"));
+    expectNothingOutsideChanged();
+}
+
+TEST_F(SafeLinkGuard, RefusesAFastForwardToo)
+{
+    linkFolder();
+    const NothingChanges nothing(repository_);
+    try
+    {
+        branches().merge("adds");
+        ADD_FAILURE() << "nothing was raised";
+    }
+    catch (const std::exception &exception)
+    {
+        EXPECT_THAT(exception.what(), HasSubstr("'dir' is in the way"));
+    }
+    expectNothingOutsideChanged();
+}
+
+TEST_F(SafeLinkGuard, IsNoObstacleAboveFilesThatStayAsTheyAre)
+{
+    linkFolder();
+    repository_.symlink("outside", "../link");
+    repository_.symlink("nowhere", "untracked");
+    const auto expected = stateAfterGit("elsewhere");
+    switchTo("elsewhere");
+    expectSame(stateOf(repository_), expected);
+    EXPECT_TRUE(fs::is_symlink(repository_ / "dir"));
+    expectNothingOutsideChanged();
+}
+
+TEST_F(SafeLinkGuard, IsNoObstacleWhereTheLinkItselfIsTracked)
+{
+    makeBranch("link", [this] { linkFolder(); });
+    makeBranch("file",
+               [this]
+               {
+                   repository_.remove("dir");
+                   repository_.write("dir", "x");
+               });
+    for (const auto *branch : {"link", "main", "link", "file", "link", "adds"})
+    {
+        SCOPED_TRACE(branch);
+        const auto expected = stateAfterGit(branch);
+        switchTo(branch);
+        expectSame(stateOf(repository_), expected);
+        EXPECT_THAT(status(), IsEmpty());
+    }
+    expectNothingOutsideChanged();
+}
+
+TEST_F(SafeLinkGuard, LeavesConflictsThatLibGit2FindsToIt)
+{
+    repository_.symlink("../outside/dir/a", "new");
+    expectRefused("elsewhere", {GIT_ECONFLICT, GIT_ERROR_CHECKOUT, "1 conflict prevents checkout"});
+}
+
+TEST_F(SafeLinkGuard, HandsTheNotificationsOn)
+{
+    linkFolder();
+    interactor_->cancel();
+    expectCancelled("adds");
+    expectRefused("adds", inTheWay("dir"));
+    repository_.remove("dir");
+    EXPECT_NO_THROW(switchTo("adds"));
+}
+
+} // namespace
