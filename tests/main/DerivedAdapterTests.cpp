@@ -1,13 +1,16 @@
 // SPDX-License-Identifier: MIT
+#include <filesystem>
 #include <map>
 #include <stdexcept>
 #include <string>
 #include <vector>
 
+#include <boost/filesystem/exception.hpp>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include "StagingTest.hpp"
+#include "vclink/git/LibGit2Exception.hpp"
 
 namespace
 {
@@ -159,6 +162,21 @@ TEST_F(DerivedAdapter, IsNotAskedWhenAFileIsMarkedAsResolved)
     adapter_.markResolved(files({"file"}).front());
     EXPECT_THAT(adapter_.questions, IsEmpty());
     EXPECT_THAT(status(), ElementsAre("M  file"));
+}
+
+/// Staging opens the root before it looks at the paths, a revert looks at the paths first.
+TEST_F(DerivedAdapter, ComesToTheRootAndToThePathsInTurn)
+{
+    const std::string root = folder() / "no repository";
+    std::filesystem::create_directory(root);
+    std::filesystem::create_symlink("loop", root + "/loop");
+    const upath loop = vclink::test::asPath(root + "/loop");
+    AnsweringAdapter adapter(vclink::test::asPath(root),
+                             std::static_pointer_cast<vclink::ApplicationInteractor>(interactor_));
+    adapter.answer.emplace(loop, FileState(FileState::Unversioned));
+    EXPECT_THROW(adapter.addFiles({loop}), vclink::git::LibGit2Exception);
+    EXPECT_THROW(adapter.removeFiles({loop}), vclink::git::LibGit2Exception);
+    EXPECT_THROW(adapter.revertFiles({loop}), boost::filesystem::filesystem_error);
 }
 
 TEST_F(DerivedAdapter, PassesItsOwnExceptionOn)
