@@ -154,8 +154,8 @@ TEST_F(RunCommand, HandsStandardInputOver)
 TEST_F(RunCommand, GivesTheCommandItsOutputAndNoOtherPipe)
 {
     const std::string out = folder() / "descriptors";
-    const std::string program =
-        scripts_.shell("for number in /proc/$$/fd/*; do readlink $number; done >" + out);
+    const std::string program = scripts_.shell(
+        "for number in /proc/$$/fd/*; do readlink $number; done >" + out + "; exit 0");
     std::set<std::string> before;
     for (const auto &descriptor : vclink::test::openDescriptors())
         before.insert(descriptor.second);
