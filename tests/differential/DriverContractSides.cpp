@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: MIT
 // What the command leaves, what the sides are, where the driver comes from.
+#include <cstdlib>
 #include <filesystem>
 
 #include "DriverContract.hpp"
@@ -100,6 +101,24 @@ DriverCase definedIn(const std::string &name, const std::vector<std::string> &fi
                       });
 }
 
+/// A driver that the system's file defines, where no name of a file below the home folder is given
+/// that has the command instead.
+DriverCase inTheSystemFile(const std::string &name, const std::string &other)
+{
+    return configured(name,
+                      [other](const GitRepository &repository,
+                              const HermeticEnvironment &environment, const std::string &command)
+                      {
+                          // Where the environment has libgit2 look for it.
+                          const auto system = environment.home().parent_path() / "etc/gitconfig";
+                          defineIn(repository, system, other.empty() ? command : "false");
+                          if (!other.empty())
+                              defineIn(repository, environment.home() / other, command);
+                          ::unsetenv("GIT_CONFIG_NOSYSTEM");
+                          ::setenv("GIT_CONFIG_SYSTEM", system.c_str(), 1);
+                      });
+}
+
 DriverCase attributed(const std::string &name, const std::string &attributes,
                       const DriverExpectation &expectation = {})
 {
@@ -187,6 +206,9 @@ std::vector<DriverCase> configurationCases()
     return {
         none,
         clean,
+        inTheSystemFile("InTheSystemFile", {}),
+        inTheSystemFile("InTheGlobalBeforeTheSystemFile", ".gitconfig"),
+        inTheSystemFile("InTheXdgBeforeTheSystemFile", ".config/git/config"),
         definedIn("InTheGlobalFile", {".gitconfig"}),
         definedIn("InTheXdgFile", {".config/git/config"}),
         definedIn("InTheRepositoryBeforeTheGlobalFile", {".gitconfig", ""}),

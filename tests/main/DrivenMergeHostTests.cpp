@@ -1,0 +1,135 @@
+// SPDX-License-Identifier: MIT
+// Merges with a command, from adapter to merge commit, in hosts of different kinds.
+#include <algorithm>
+#include <csignal>
+#include <cstdlib>
+#include <filesystem>
+#include <string>
+#include <thread>
+#include <vector>
+
+#include <fcntl.h>
+#include <gtest/gtest.h>
+#include <sys/resource.h>
+#include <unistd.h>
+
+#include "../util/SignalAction.hpp"
+#include "DrivenMergeTest.hpp"
+#include "support/UnprivilegedUser.hpp"
+
+namespace
+{
+
+namespace fs = std::filesystem;
+using vclink::test::NothingLeft;
+using vclink::test::Scripts;
+using vclink::test::SignalAction;
+
+class DrivenMergeHost : public vclink::test::DrivenMergeTest
+{
+  protected:
+    DrivenMergeHost()
+    {
+        defineJoining();
+    }
+    /// What a host does: an adapter and a branch manager for this merge.
+    void mergeAnew() const
+    {
+        const NothingLeft check(environment().temporary());
+        const auto adapter = makeAdapter(repository_.path());
+        vclink::git::BranchManager::create(*adapter)->merge("topic");
+    }
+};
+
+TEST_F(DrivenMergeHost, MayIgnoreOrTakeASignalOfABrokenPipe)
+{
+    for (auto *const handler : {SIG_DFL, SIG_IGN})
+    {
+        const SignalAction action(SIGPIPE, handler);
+        mergeAnew();
+        expectJoined();
+    }
+}
+
+TEST_F(DrivenMergeHost, MayHandleTheEndOfItsChildren)
+{
+    const SignalAction handled(SIGCHLD, [](int) {});
+    mergeAnew();
+    expectJoined();
+}
+
+TEST_F(DrivenMergeHost, MayHaveAThousandDescriptorsOpen)
+{
+    rlimit before{};
+    ASSERT_EQ(::getrlimit(RLIMIT_NOFILE, &before), 0);
+    rlimit more = before;
+    more.rlim_cur = std::min<rlim_t>(before.rlim_max, 4096);
+    ASSERT_EQ(::setrlimit(RLIMIT_NOFILE, &more), 0);
+    std::vector<int> open;
+    for (int i = 0; i < 1000; ++i)
+        open.push_back(::open("/dev/null", O_RDONLY | O_CLOEXEC));
+    EXPECT_GE(*std::max_element(open.begin(), open.end()), 1000);
+    mergeAnew();
+    for (const int descriptor : open)
+        ::close(descriptor);
+    ::setrlimit(RLIMIT_NOFILE, &before);
+    expectJoined();
+}
+
+TEST_F(DrivenMergeHost, MayHaveNoWorkingFolderAnyMore)
+{
+    const fs::path before = fs::current_path();
+    fs::create_directory(folder() / "gone");
+    fs::current_path(folder() / "gone");
+    fs::remove(folder() / "gone");
+    EXPECT_NO_THROW(mergeAnew());
+    fs::current_path(before);
+    expectJoined();
+}
+
+TEST_F(DrivenMergeHost, MayMergeOnAnyThread)
+{
+    std::thread([this] { mergeAnew(); }).join();
+    expectJoined();
+}
+
+TEST_F(DrivenMergeHost, MayHaveABlankInItsTemporaryFolderForACommandThatQuotes)
+{
+    const fs::path temporary = folder() / "a b";
+    fs::create_directory(temporary);
+    ::setenv("TMPDIR", temporary.c_str(), 1);
+    define(scripts_.shell("cat \"$1\" \"$3\" >>\"$2\"") + " \"%O\" \"%A\" \"%B\"");
+    mergeAnew();
+    EXPECT_TRUE(fs::is_empty(temporary));
+    expectJoined();
+}
+
+TEST_F(DrivenMergeHost, WithABlankInItsTemporaryFolderSplitsTheNames)
+{
+    const fs::path temporary = folder() / "a b";
+    fs::create_directory(temporary);
+    ::setenv("TMPDIR", temporary.c_str(), 1);
+    defineScript("test $# = 6 && exit 1");
+    expectConflicts("topic");
+    EXPECT_TRUE(fs::is_empty(temporary));
+}
+
+TEST_F(DrivenMergeHost, WithoutAWritableTemporaryFolderRunsTheCommandOnNothing)
+{
+    const fs::path temporary = folder() / "locked";
+    fs::create_directory(temporary);
+    ::setenv("TMPDIR", temporary.c_str(), 1);
+    defineScript("for f; do test -e \"$f\" && exit 1; done; exit 0");
+    vclink::test::giveToUnprivilegedUser(folder().path());
+    fs::permissions(temporary, fs::perms(0555));
+    const std::string answer = vclink::test::runAsUnprivilegedUser(
+        [this]() -> std::string
+        {
+            mergeAnew();
+            const std::string merged = repository_.git({"cat-file", "blob", "HEAD:file"});
+            return merged.empty() ? std::string() : "merged to " + merged;
+        });
+    EXPECT_EQ(answer, "");
+}
+
+} // namespace
