@@ -55,9 +55,7 @@ int SafeLinkGuard::notify(git_checkout_notify_t why, const char *path,
 {
     const auto &guard = *static_cast<SafeLinkGuard *>(payload);
     const int code = guard.next_(why, path, baseline, target, workdir, guard.nextPayload_);
-    // libgit2 refuses what is a conflict to it by itself.
-    if (code != 0 || why == GIT_CHECKOUT_NOTIFY_CONFLICT || workdir == nullptr ||
-        !S_ISLNK(workdir->mode))
+    if (code != 0 || workdir == nullptr || !S_ISLNK(workdir->mode))
     {
         return code;
     }
@@ -75,22 +73,17 @@ int SafeLinkGuard::notify(git_checkout_notify_t why, const char *path,
     }
 }
 
-/// Whether there is a folder of this name that the checkout makes, changes or takes away. A file or
-/// link of this name is none of it: where HEAD has one, libgit2 sees that it is unchanged.
+/// Whether there is a folder of this name that the checkout makes, changes or takes away.
 bool SafeLinkGuard::isChangedFolder(const std::string &name) const
 {
     const auto before = revparseObject(repository_, "HEAD:" + name);
     const auto after = revparseObject(repository_, target_ + ':' + name);
-    if (before.has_value() && !isFolder(before))
-    {
-        return false;
-    }
     if (!isFolder(before) || !isFolder(after))
     {
         return isFolder(before) || isFolder(after);
     }
-    return git_oid_equal(git_object_id(before.value().get()), git_object_id(after.value().get())) ==
-           0;
+    const git_oid *const id = git_object_id(before.value().get());
+    return git_oid_equal(id, git_object_id(after.value().get())) == 0;
 }
 
 } // namespace vclink::git

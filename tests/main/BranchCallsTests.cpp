@@ -4,6 +4,7 @@
 #include <string>
 #include <vector>
 
+#include <fcntl.h>
 #include <git2.h>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
@@ -107,6 +108,7 @@ class BranchCallsTest : public vclink::test::MergeTest
         EXPECT_EQ(record.baseline, nullptr);
         EXPECT_EQ(record.target_directory, nullptr);
         EXPECT_EQ(record.disable_filters, 0);
+        EXPECT_EQ(record.file_open_flags, O_CREAT | O_TRUNC | O_WRONLY | O_NOFOLLOW);
     }
 };
 

@@ -38,17 +38,15 @@ class SafeLinkGuard : public vclink::test::SwitchBranchTest
         repository_.commitAll("second");
         makeBranch("adds", [this] { repository_.write("dir/new", "x"); });
         makeBranch("edits", [this] { repository_.write("dir/b", "of the branch\n"); });
+        makeBranch("edits-the-first", [this] { repository_.write("dir/a", "of the branch\n"); });
         makeBranch("drops", [this] { repository_.remove("dir/b"); });
-        makeBranch("drops all", [this] { repository_.remove("dir"); });
+        makeBranch("drops-all", [this] { repository_.remove("dir"); });
         makeBranch("elsewhere", [this] { repository_.write("new", "x"); });
     }
 
     template <class Change> void makeBranch(const std::string &name, Change change)
     {
-        std::string branch = name;
-        for (char &character : branch)
-            character = character == ' ' ? '-' : character;
-        repository_.git({"checkout", "--quiet", "-b", branch, "main"});
+        repository_.git({"checkout", "--quiet", "-b", name, "main"});
         change();
         repository_.commitAll(name);
         repository_.git({"checkout", "--quiet", "main"});
@@ -74,24 +72,13 @@ class SafeLinkGuard : public vclink::test::SwitchBranchTest
 TEST_F(SafeLinkGuard, RefusesToGoThroughALinkThatStandsForAFolder)
 {
     linkFolder();
-    for (const auto *branch : {"adds", "edits", "drops"})
+    for (const auto *branch : {"adds", "edits", "edits-the-first", "drops", "drops-all"})
     {
         SCOPED_TRACE(branch);
-        const NothingChanges nothing(repository_);
-        const auto failure = vclink::test::libGit2FailureOf([&] { switchTo(branch); });
-        EXPECT_EQ(failure.code, GIT_ECONFLICT);
+        expectRefused(branch, inTheWay("dir"));
         expectNothingOutsideChanged();
     }
-    expectRefused("adds", inTheWay("dir"));
     EXPECT_FALSE(repository_.tryGit({"checkout", "adds"}).succeeded());
-}
-
-TEST_F(SafeLinkGuard, RefusesToTakeAFolderAwayThroughALink)
-{
-    linkFolder();
-    const NothingChanges nothing(repository_);
-    vclink::test::libGit2FailureOf([this] { switchTo("drops-all"); });
-    expectNothingOutsideChanged();
 }
 
 TEST_F(SafeLinkGuard, RefusesALinkThatLeadsToAnotherFolderOfTheWorkingCopy)
@@ -111,23 +98,27 @@ TEST_F(SafeLinkGuard, RefusesALinkThatIsDeeperDown)
     EXPECT_FALSE(fs::exists(folder() / "outside/dir/deep/new"));
 }
 
-/// libgit2 comes to the link before it comes to "new-b", and forgets of it before "new/file".
-TEST_F(SafeLinkGuard, RefusesALinkThatStandsForAFolderOfTheBranch)
+/// libgit2 is past the link with the first of these, and sees no conflict in the second.
+TEST_F(SafeLinkGuard, RefusesALinkThatLibGit2IsPast)
 {
+    repository_.write("dir-b", "x");
     repository_.write("new-b", "x");
     repository_.commitAll("third");
     makeBranch("makes", [this] { repository_.write("new/file", "x"); });
+    makeBranch("takes", [this] { repository_.remove("dir"); });
     repository_.symlink("../outside", "new");
     expectRefused("makes", inTheWay("new"));
     EXPECT_FALSE(fs::exists(folder() / "outside/file"));
+    linkFolder();
+    expectRefused("takes", inTheWay("dir"));
+    expectNothingOutsideChanged();
 }
 
 TEST_F(SafeLinkGuard, RefusesALinkThatIsStaged)
 {
     linkFolder();
     repository_.add({"dir"});
-    const NothingChanges nothing(repository_);
-    vclink::test::libGit2FailureOf([this] { switchTo("adds"); });
+    expectRefused("adds", inTheWay("dir"));
     expectNothingOutsideChanged();
 }
 
