@@ -6,7 +6,6 @@
 #include <cstddef>
 
 #include <fcntl.h>
-#include <git2/diff.h>
 #include <git2/repository.h>
 #include <sys/stat.h>
 #include <unistd.h>
@@ -67,7 +66,7 @@ int LinkGuard::notify(git_checkout_notify_t why, const char *path, const git_dif
     }
     try
     {
-        guard.clearTheWay(path, S_ISREG(target->mode));
+        guard.clearTheWay(path);
         return 0;
     }
     catch (...)
@@ -76,16 +75,13 @@ int LinkGuard::notify(git_checkout_notify_t why, const char *path, const git_dif
     }
 }
 
-void LinkGuard::clearTheWay(const std::string &name, bool isRegularFile)
+void LinkGuard::clearTheWay(const std::string &name)
 {
     for (auto end = name.find('/'); end != std::string::npos; end = name.find('/', end + 1))
     {
         removeLink(workdir_ + name.substr(0, end));
     }
-    if (isRegularFile)
-    {
-        removeLink(workdir_ + name);
-    }
+    removeLink(workdir_ + name);
 }
 
 void LinkGuard::removeLink(const std::string &path)

@@ -31,7 +31,7 @@ class LinkGuard
     static int notify(git_checkout_notify_t why, const char *path, const git_diff_file *baseline,
                       const git_diff_file *target, const git_diff_file *workdir,
                       void *payload) noexcept;
-    void clearTheWay(const std::string &name, bool isRegularFile);
+    void clearTheWay(const std::string &name);
     void removeLink(const std::string &path);
 
     std::string workdir_;

@@ -109,8 +109,9 @@ TEST_F(RevertedKinds, TakesAStagedChangeOfAFileToALinkBack)
 {
     repository_.remove("file");
     repository_.symlink("nowhere", "file");
-    repository_.add({"file"});
-    expectRevertsAsGit({"file"});
+    repository_.write("other", "edited\n");
+    repository_.add({"file", "other"});
+    expectRevertsAsGit({"file", "other"});
     EXPECT_THAT(status(), ElementsAre());
 }
 
@@ -203,6 +204,21 @@ TEST_F(RevertedKinds, BringsBackTheFolderOfASubmodule)
     repository_.remove("module");
     expectRevertsAsGit({"module"});
     EXPECT_TRUE(fs::is_empty(repository_ / "module"));
+}
+
+TEST_F(RevertedKinds, MakesAFolderAgainOfALinkThatStandsForASubmodule)
+{
+    auto inner = makeRepository("inner");
+    inner.write("file", "x");
+    inner.commitAll("first");
+    repository_.git({"submodule", "--quiet", "add", inner.path().string(), "sub/module"});
+    repository_.commit("second");
+    repository_.write("../outside/file", "precious");
+    repository_.remove("sub/module");
+    repository_.symlink("../../outside", "sub/module");
+    expectRevertsAsGit({"sub"});
+    EXPECT_TRUE(fs::is_empty(repository_ / "sub/module"));
+    EXPECT_EQ(repository_.read("../outside/file"), "precious");
 }
 
 TEST_F(RevertedKinds, TakesAnIntentToAddOutOfTheIndex)

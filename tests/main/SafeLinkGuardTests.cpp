@@ -133,6 +133,17 @@ TEST_F(SafeLinkGuard, RefusesALinkThatIsIgnored)
     expectNothingOutsideChanged();
 }
 
+TEST_F(SafeLinkGuard, LetsAnIgnoredLinkGiveWayToALinkOfTheBranch)
+{
+    makeBranch("links", [this] { repository_.symlink("same", "new"); });
+    repository_.write(".git/info/exclude", "new\n");
+    repository_.symlink("../outside/dir/a", "new");
+    const auto expected = stateAfterGit("links");
+    switchTo("links");
+    expectSame(stateOf(repository_), expected);
+    expectNothingOutsideChanged();
+}
+
 TEST_F(SafeLinkGuard, RefusesAFastForwardToo)
 {
     linkFolder();
