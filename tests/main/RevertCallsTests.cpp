@@ -105,6 +105,26 @@ TEST_F(RevertCalls, LookForNothingElseWithoutAChange)
     EXPECT_EQ(calls_.names, toTheReset + makingOptions + checkout + released);
 }
 
+TEST_F(RevertCalls, ResetOnceWhereFilesWereOnlyAdded)
+{
+    repository_.write("new", "x");
+    repository_.add({"new"});
+    revert({"new", "file"});
+    EXPECT_THAT(targets_, testing::SizeIs(1));
+}
+
+TEST_F(RevertCalls, ResetOnceHoweverTheRootIsWritten)
+{
+    const std::string root = repository_.path();
+    for (const auto *end : {"/", "//", "/.", "/sub/.."})
+    {
+        targets_.clear();
+        repository_.write("file", "edited");
+        vclink::git::GitAdapter(asPath(root + end), factory_).revertFiles(files({"file"}));
+        EXPECT_THAT(targets_, testing::SizeIs(1)) << end;
+    }
+}
+
 TEST_F(RevertCalls, ResetASecondTimeWhereAFileIsLostOnTheWay)
 {
     repository_.remove("file");
