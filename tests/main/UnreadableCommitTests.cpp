@@ -4,9 +4,12 @@
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
+#include <sys/stat.h>
+#include <unistd.h>
 
 #include "CommitTest.hpp"
 #include "support/UnprivilegedUser.hpp"
+#include "vclink/git/LibGit2Exception.hpp"
 
 namespace
 {
@@ -76,6 +79,20 @@ TEST_F(UnreadableCommit, IsRefusedOverAFolderThatCanBeEnteredAndNotListed)
                   "-1 2 could not read 'sub/deep/lowest', which is tracked: Permission denied");
     expectRefused("sub/deep", 0311,
                   "-1 2 could not read 'sub/deep/lowest', which is tracked: Permission denied");
+}
+
+/// What counts is the user by whose rights files are opened.
+TEST_F(UnreadableCommit, IsRefusedWhateverTheRealUserMayRead)
+{
+    struct stat owned = {};
+    ASSERT_EQ(::stat(repository_.path().c_str(), &owned), 0);
+    repository_.setMode("sub", 0311);
+    const uid_t before = ::geteuid();
+    ASSERT_EQ(::seteuid(owned.st_uid), 0);
+    EXPECT_THROW(commit(), vclink::git::LibGit2Exception);
+    ASSERT_EQ(::seteuid(before), 0);
+    repository_.setMode("sub", 0755);
+    EXPECT_EQ(repository_.git({"diff", "--cached", "--name-only"}), "");
 }
 
 TEST_F(UnreadableCommit, IsRefusedOverAFolderThatCanBeListedAndNotEntered)
