@@ -3,6 +3,7 @@
 #include <cerrno>
 #include <csignal>
 #include <filesystem>
+#include <ios>
 #include <stdexcept>
 #include <string>
 #include <system_error>
@@ -150,6 +151,14 @@ TEST_F(MergeDriverFailure, IsLibGit2sWhenTheConfigurationCannotBeRead)
     {
         EXPECT_EQ(exception.getError().getErrorClass(), GIT_ERROR_CONFIG);
     }
+}
+
+TEST_F(MergeDriverFailure, IsTheStreamsWhenTheFileOfOursHasBecomeAFolder)
+{
+    makeConflict();
+    defineScript("tool", "rm \"$2\"; mkdir \"$2\"");
+    EXPECT_THROW(mergeOrThrow(), std::ios_base::failure);
+    EXPECT_EQ(repository_.git({"status", "--porcelain"}), "");
 }
 
 TEST_F(MergeDriverFailure, EndsTheMergeWithTheCodeOfACallback)
