@@ -28,7 +28,7 @@ namespace
 /// @return whether it could be
 bool readAll(int descriptor, std::string &bytes)
 {
-    std::array<char, 1024> part{};
+    std::array<char, 256> part{};
     ssize_t size = 0;
     while ((size = ::read(descriptor, part.data(), part.size())) != 0)
     {

@@ -185,7 +185,7 @@ TEST_F(StartGuardTest, ListsAnyNumberOfChildren)
 {
     std::vector<pid_t> earlier;
     // Their list is longer than one reading of it.
-    for (int i = 0; i < 400; ++i)
+    for (int i = 0; i < 100; ++i)
     {
         earlier.push_back(makeChild(EXIT_FAILURE));
         awaitEnd(earlier.back());
