@@ -1,8 +1,23 @@
 // SPDX-License-Identifier: MIT
 #include "GitServer.hpp"
 
+#include <fstream>
+#include <system_error>
+#include <utility>
+
 namespace vclink::test
 {
+
+ScopedFile::ScopedFile(std::filesystem::path file, const std::string &text) : file_(std::move(file))
+{
+    std::ofstream(file_) << text << std::flush;
+}
+
+ScopedFile::~ScopedFile()
+{
+    std::error_code ignored;
+    std::filesystem::remove(file_, ignored);
+}
 
 GitServer::GitServer()
 {
@@ -26,6 +41,11 @@ GitRepository GitServer::makeRepository()
 std::string GitServer::url(const GitRepository &repository) const
 {
     return base() + "/" + repository.path().filename().string();
+}
+
+ScopedFile GitServer::writeSettings(const std::string &text) const
+{
+    return {folder() / ".gitconfig", text};
 }
 
 void GitServer::prepareClient() const

@@ -11,6 +11,19 @@
 namespace vclink::test
 {
 
+/// A file that is removed at the end.
+class ScopedFile
+{
+  public:
+    ScopedFile(std::filesystem::path file, const std::string &text);
+    ScopedFile(const ScopedFile &) = delete;
+    ScopedFile &operator=(const ScopedFile &) = delete;
+    ~ScopedFile();
+
+  private:
+    std::filesystem::path file_;
+};
+
 /// A place that repositories are cloned from and pushed to. It lives as long as a suite of tests.
 class GitServer
 {
@@ -28,6 +41,9 @@ class GitServer
     std::string url(const GitRepository &repository) const;
     /// What all of the server's addresses begin with.
     virtual std::string base() const = 0;
+
+    /// Gives the server's programs a configuration, until the object ends.
+    ScopedFile writeSettings(const std::string &text) const;
 
     /// Sets the variables that git needs to get in, which libgit2 does not read, and the agent's
     /// for both. To be called in a hermetic environment.

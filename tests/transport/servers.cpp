@@ -70,9 +70,4 @@ void RunningServer::stopServers()
     runningServers().clear();
 }
 
-bool RunningServer::isLocal()
-{
-    return GetParam() == Transport::path || GetParam() == Transport::file;
-}
-
 } // namespace vclink::test

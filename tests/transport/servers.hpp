@@ -42,8 +42,6 @@ class RunningServer : public testing::WithParamInterface<Transport>
     {
         return server_;
     }
-    /// Whether there is no server, and libgit2 works on the other repository itself.
-    static bool isLocal();
 
   private:
     GitServer &server_;

@@ -1,0 +1,156 @@
+// SPDX-License-Identifier: MIT
+#include <string>
+
+#include <gtest/gtest.h>
+
+#include "TransportTest.hpp"
+
+namespace
+{
+
+using vclink::test::GitRepository;
+using vclink::test::referencesOf;
+using vclink::test::Transport;
+
+/// Two clones of one repository: what the library fetches into the one is what git fetches into the
+/// other.
+class Fetch : public vclink::test::TransportTest
+{
+  protected:
+    Fetch()
+    {
+        change("file", "first\n");
+        source_.git({"branch", "deleted"});
+        publish({"--all"});
+        fetched_ = cloneWithGit("fetched");
+        fetchedByGit_ = cloneWithGit("fetched by git");
+    }
+
+    /// Fetches into both.
+    void fetchBoth()
+    {
+        fetch(fetched_);
+        fetchedByGit_.git({"fetch", "--quiet"});
+    }
+    void expectSame() const
+    {
+        EXPECT_EQ(referencesOf(fetched_), referencesOf(fetchedByGit_));
+        expectSound(fetched_);
+    }
+    /// The id of a reference that was fetched, empty where there is none.
+    std::string fetchedId(const std::string &reference) const
+    {
+        return fetched_.line({"for-each-ref", "--format=%(objectname)", reference});
+    }
+
+    GitRepository fetched_{folder().path()};
+    GitRepository fetchedByGit_{folder().path()};
+};
+
+TEST_P(Fetch, TakesANewBranch)
+{
+    source_.git({"switch", "--quiet", "--create", "new"});
+    const std::string id = change("file", "new\n");
+    publish({"new"});
+    fetchBoth();
+    EXPECT_EQ(fetchedId("refs/remotes/origin/new"), id);
+    expectSame();
+}
+
+TEST_P(Fetch, MovesTheBranchThatMoved)
+{
+    const std::string id = change("file", "second\n");
+    publish({"main"});
+    fetchBoth();
+    EXPECT_EQ(fetchedId("refs/remotes/origin/main"), id);
+    EXPECT_EQ(fetched_.read("file"), "first\n") << "the working tree is the user's";
+    expectSame();
+}
+
+TEST_P(Fetch, MovesTheBranchThatWasRewritten)
+{
+    change("file", "second\n");
+    publish({"main"});
+    fetchBoth();
+    source_.git({"reset", "--quiet", "--hard", "HEAD~"});
+    const std::string id = change("file", "another second\n");
+    publish({"+main"});
+    fetchBoth();
+    EXPECT_EQ(fetchedId("refs/remotes/origin/main"), id);
+    expectSame();
+}
+
+TEST_P(Fetch, KeepsTheBranchThatTheRemoteDeletedAsGitDoes)
+{
+    const std::string id = fetchedId("refs/remotes/origin/deleted");
+    publish({":deleted"});
+    fetchBoth();
+    EXPECT_NE(id, "");
+    EXPECT_EQ(fetchedId("refs/remotes/origin/deleted"), id);
+    expectSame();
+}
+
+TEST_P(Fetch, RemovesTheBranchThatTheRemoteDeletedWherePruneIsConfigured)
+{
+    publish({":deleted"});
+    for (const auto &clone : {fetched_, fetchedByGit_})
+        clone.git({"config", "remote.origin.prune", "true"});
+    fetchBoth();
+    EXPECT_EQ(fetchedId("refs/remotes/origin/deleted"), "");
+    expectSame();
+}
+
+TEST_P(Fetch, TakesTheTagsOfWhatItTakes)
+{
+    change("file", "second\n");
+    source_.git({"tag", "light"});
+    source_.git(
+        {"-c", "user.name=a", "-c", "user.email=a@example.com", "tag", "-m", "tag", "annotated"});
+    publish({"main", "light", "annotated"});
+    fetchBoth();
+    EXPECT_NE(fetchedId("refs/tags/light"), "");
+    EXPECT_NE(fetchedId("refs/tags/annotated"), "");
+    expectSame();
+}
+
+TEST_P(Fetch, OfNothingNewChangesNothing)
+{
+    const std::string before = referencesOf(fetched_);
+    fetchBoth();
+    EXPECT_EQ(referencesOf(fetched_), before);
+    expectSame();
+}
+
+TEST_P(Fetch, TakesWhatTheRefspecsNameOnly)
+{
+    const std::string id = change("file", "second\n");
+    publish({"main", "main:other"});
+    fetch(fetched_, {"refs/heads/main:refs/remotes/elsewhere/one"});
+    EXPECT_EQ(fetchedId("refs/remotes/elsewhere/one"), id);
+    EXPECT_EQ(fetchedId("refs/remotes/origin/other"), "");
+    expectSound(fetched_);
+}
+
+TEST_P(Fetch, TakesAThousandCommits)
+{
+    const std::string tip = change("file", "the first of many\n");
+    std::string commits;
+    for (int i = 1; i <= 1000; ++i)
+    {
+        commits += "commit refs/heads/many\ncommitter a <a@example.com> " +
+                   std::to_string(1'600'000'000 + i) + " +0000\ndata 2\nm\n" +
+                   (i == 1 ? "from " + tip + "\n" : "") + "M 644 inline file\ndata <<END\n" +
+                   std::to_string(i) + "\nEND\n\n";
+    }
+    const auto imported =
+        source_.command({"fast-import", "--quiet"}).input(commits + "done\n").run();
+    ASSERT_TRUE(imported.succeeded()) << imported.errors;
+    publish({"many"});
+    fetchBoth();
+    EXPECT_EQ(fetched_.line({"rev-list", "--count", "refs/remotes/origin/many"}), "1002");
+    expectSame();
+}
+
+VCLINK_OVER_ALL_TRANSPORTS(Fetch);
+
+} // namespace

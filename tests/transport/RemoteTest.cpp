@@ -1,0 +1,78 @@
+// SPDX-License-Identifier: MIT
+#include "RemoteTest.hpp"
+
+#include <utility>
+
+#include "support/text.hpp"
+#include "vclink/git/GitAdapterFactory.hpp"
+
+namespace vclink::test
+{
+namespace
+{
+
+std::vector<ustring> asTexts(const std::vector<std::string> &texts)
+{
+    std::vector<ustring> converted;
+    for (const auto &text : texts)
+        converted.push_back(asUtf16(text));
+    return converted;
+}
+
+} // namespace
+
+void PrintTo(const Failure &failure, std::ostream *stream)
+{
+    *stream << "code " << failure.code << ", class " << failure.errorClass << ": "
+            << failure.message;
+}
+
+std::string referencesOf(const GitRepository &repository)
+{
+    return repository.git({"for-each-ref", "--format=%(refname) %(objectname) %(symref)"});
+}
+
+std::unique_ptr<WorkingCopyGenerator> RemoteTest::makeGenerator() const
+{
+    return git::GitAdapterFactory().createWorkingCopyGenerator(interactor_);
+}
+
+std::unique_ptr<CMAdapter> RemoteTest::makeAdapter(const GitRepository &repository) const
+{
+    return git::GitAdapterFactory().createAdapterFor(asPath(repository.path()), interactor_);
+}
+
+GitRepository RemoteTest::clone(const std::string &url, const std::string &name) const
+{
+    makeGenerator()->generate(asUtf16(url), asPath(folder() / name));
+    return GitRepository(folder() / name);
+}
+
+void RemoteTest::fetch(const GitRepository &repository,
+                       const std::vector<std::string> &refspecs) const
+{
+    const auto adapter = makeAdapter(repository);
+    git::GitRemote::create("origin", *adapter)->fetch(asTexts(refspecs));
+}
+
+void RemoteTest::push(const GitRepository &repository,
+                      const std::vector<std::string> &refspecs) const
+{
+    const auto adapter = makeAdapter(repository);
+    git::GitRemote::create("origin", *adapter)->push(asTexts(refspecs));
+}
+
+std::vector<git::GitRemoteHead> RemoteTest::heads(const GitRepository &repository) const
+{
+    const auto adapter = makeAdapter(repository);
+    return git::GitRemote::create("origin", *adapter)->getRemoteHeads();
+}
+
+void RemoteTest::expectSound(const GitRepository &repository)
+{
+    const auto check = repository.tryGit({"fsck", "--strict", "--no-dangling"});
+    EXPECT_TRUE(check.succeeded()) << check.errors;
+    EXPECT_EQ(repository.git({"status", "--porcelain"}), "");
+}
+
+} // namespace vclink::test

@@ -1,0 +1,169 @@
+// SPDX-License-Identifier: MIT
+#include <iostream>
+#include <memory>
+#include <string>
+#include <vector>
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include <git2.h>
+
+#include "RemoteTest.hpp"
+#include "WebServer.hpp"
+#include "error/logging/severity.hpp"
+#include "support/LogCapture.hpp"
+
+namespace
+{
+
+using testing::Contains;
+using vclink::test::GitRepository;
+using vclink::test::LogCapture;
+using vclink::test::WebServer;
+using Site = vclink::test::WebServer::Site;
+
+/// Has the server of the suites running before the test's environment is made.
+class RunningWebServer
+{
+  protected:
+    RunningWebServer()
+    {
+        if (!running)
+            running = std::make_unique<WebServer>(Site::https);
+    }
+    static WebServer &server()
+    {
+        return *running;
+    }
+    static std::unique_ptr<WebServer> running;
+};
+std::unique_ptr<WebServer> RunningWebServer::running;
+
+class WebTest : public RunningWebServer, public vclink::test::RemoteTest
+{
+  protected:
+    WebTest()
+    {
+        auto source = makeRepository("source");
+        commit_ = source.commit("first");
+        source.git({"push", "--quiet", served_.path(), "HEAD:refs/heads/main"});
+    }
+    static void TearDownTestSuite()
+    {
+        running.reset();
+    }
+
+    GitRepository served_ = server().makeRepository();
+    std::string commit_;
+};
+
+class WebPassword : public WebTest, public testing::WithParamInterface<Site>
+{
+};
+
+TEST_P(WebPassword, IsAskedForInVain)
+{
+    const std::string url = server().urlAt(GetParam(), served_);
+    const LogCapture log(vclink::git::SeverityParameter);
+    const auto failure = vclink::test::failureOf([&] { clone(url, "clone"); });
+    std::cout << "ends with " << testing::PrintToString(failure) << '\n';
+    EXPECT_EQ(failure.code, GIT_ERROR);
+    EXPECT_FALSE(std::filesystem::exists(folder() / "clone"));
+    EXPECT_THAT(log.messages(), Contains(" url=" + url + " username_from_url= allowed_types=1"))
+        << "GIT_CREDENTIAL_USERPASS_PLAINTEXT alone, once";
+}
+
+TEST_P(WebPassword, InTheAddressIsTakenByLibgit2Itself)
+{
+    std::string url = server().urlAt(GetParam(), served_);
+    url.insert(url.find("//") + 2, WebServer::user() + ":" + WebServer::password() + "@");
+    EXPECT_EQ(clone(url, "clone").line({"rev-parse", "HEAD"}), commit_);
+}
+
+INSTANTIATE_TEST_SUITE_P(Sites, WebPassword,
+                         testing::Values(Site::httpWithPassword, Site::httpsWithPassword),
+                         [](const auto &instance)
+                         { return instance.param == Site::httpWithPassword ? "Http" : "Https"; });
+
+/// What the floor's callback is told.
+struct Told
+{
+    std::vector<int> valid;
+    std::vector<std::string> hosts;
+};
+
+int standAside(git_cert * /*certificate*/, int valid, const char *host, void *payload)
+{
+    auto &told = *static_cast<Told *>(payload);
+    told.valid.push_back(valid);
+    told.hosts.emplace_back(host);
+    return valid;
+}
+
+struct SiteOfCertificate
+{
+    const char *name;
+    Site site;
+    /// Whether libgit2 finds the certificate valid, once it trusts the authority.
+    bool valid;
+};
+
+class Certificates : public WebTest, public testing::WithParamInterface<SiteOfCertificate>
+{
+  protected:
+    Certificates()
+    {
+        // For the life of libgit2, which ends with the test.
+        EXPECT_EQ(
+            git_libgit2_opts(GIT_OPT_SET_SSL_CERT_LOCATIONS, server().authority().c_str(), nullptr),
+            0);
+    }
+
+    /// The same clone with libgit2's calls alone and a callback that answers the same.
+    int cloneAtTheFloor(Told &told) const
+    {
+        git_clone_options options;
+        git_clone_options_init(&options, GIT_CLONE_OPTIONS_VERSION);
+        options.fetch_opts.callbacks.certificate_check = standAside;
+        options.fetch_opts.callbacks.payload = &told;
+        git_repository *repository = nullptr;
+        const int code =
+            git_clone(&repository, url_.c_str(), (folder() / "floor").c_str(), &options);
+        git_repository_free(repository);
+        return code;
+    }
+
+    std::string url_ = server().urlAt(GetParam().site, served_);
+};
+
+TEST_P(Certificates, DoWithTheLibraryWhatTheyDoWithLibgit2)
+{
+    Told told;
+    EXPECT_EQ(cloneAtTheFloor(told), 0) << git_error_last()->message;
+
+    const LogCapture log(vclink::git::SeverityParameter);
+    EXPECT_EQ(clone(url_, "clone").line({"rev-parse", "HEAD"}), commit_);
+    std::vector<std::string> records;
+    for (const auto &message : log.messages())
+    {
+        if (message.find(" valid=") == 0)
+            records.push_back(message);
+    }
+    std::vector<std::string> expected;
+    for (std::size_t i = 0; i < told.valid.size(); ++i)
+        expected.push_back(" valid=" + std::to_string(told.valid[i]) + " host=" + told.hosts[i]);
+    EXPECT_EQ(records, expected);
+    EXPECT_EQ(told.valid, std::vector<int>(told.valid.size(), GetParam().valid ? 1 : 0));
+    EXPECT_THAT(told.hosts, testing::Each("localhost"));
+}
+
+INSTANTIATE_TEST_SUITE_P(
+    Are, Certificates,
+    testing::Values(SiteOfCertificate{"Valid", Site::https, true},
+                    SiteOfCertificate{"SelfSigned", Site::httpsSelfSigned, false},
+                    SiteOfCertificate{"Expired", Site::httpsExpired, false},
+                    SiteOfCertificate{"OfAnotherHost", Site::httpsWrongHost, false}),
+    [](const auto &instance) { return instance.param.name; });
+
+} // namespace
