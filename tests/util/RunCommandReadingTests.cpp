@@ -95,6 +95,15 @@ TEST_F(RunCommandReading, LastsAsLongAsAGrandchildHoldsTheOutput)
     EXPECT_EQ(vclink::test::Scripts::read(done), "yes\n");
 }
 
+TEST_F(RunCommandReading, EndsWithTheCommandThoughMoreIsThere)
+{
+    // Prints when the command has ended, and what waits for its output has not noticed.
+    const std::string grandchild =
+        scripts_.shell("until grep -q '^State:.Z' /proc/$1/status; do :; done; "
+                       "printf 'two\\nthree\\n'");
+    EXPECT_EQ(outputOf("echo one\n" + waitUntilRead() + '\n' + grandchild + " $$ &"), "onetwo");
+}
+
 TEST_F(RunCommandReading, PlaysNoPartInTheResult)
 {
     EXPECT_EQ(resultOf(scripts_.shell("echo error; exit 0")), 0);
