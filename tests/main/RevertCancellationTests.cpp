@@ -191,6 +191,27 @@ TEST_F(RevertCancellation, AskedForAmongTheNotificationsStopsAtTheNext)
     expectUsable();
 }
 
+TEST_F(RevertCancellation, PutsBackTheLinksThatWereInTheWay)
+{
+    repository_.write("../outside/precious", "x");
+    for (const auto *name : {"folder0", "folder1"})
+    {
+        repository_.remove(name);
+        repository_.symlink("../outside", name);
+    }
+    changed_ = stateOf(repository_);
+    LogCapture log(git::SeverityProgress);
+    onNotification(log, 200, [this] { interactor_->cancel(); });
+    const upath everything = vclink::test::asPath(repository_.path() / "*");
+    EXPECT_THROW(adapter_->revertFiles({everything}), CancelledOperationException);
+    expectUnstagedOnly();
+    expectUsable();
+
+    adapter_->revertFiles({everything});
+    expectReverted();
+    EXPECT_EQ(repository_.read("../outside/precious"), "x");
+}
+
 TEST_F(RevertCancellation, AskedForOnAnotherThreadStopsTheCheckout)
 {
     std::promise<void> reached;
