@@ -338,7 +338,6 @@ TEST_F(BranchCallsTest, OfConflictsAreTheseInOrder)
     expectConflicts("topic");
     const auto begin = std::find(calls.names.begin(), calls.names.end(), "index_has_conflicts");
     const auto end = std::find(begin, calls.names.end(), "repository_free");
-    const Calls attributes{"attr_get", "attr_get", "attr_value", "attr_value"};
     EXPECT_EQ(std::count(begin, end, "attr_get"), 12) << "two attributes of three stages twice";
     Calls others;
     std::copy_if(begin, end, std::back_inserter(others),

@@ -1,12 +1,31 @@
 // SPDX-License-Identifier: MIT
+#include <memory>
 #include <string>
+#include <vector>
 
 #include <gtest/gtest.h>
 
 #include "MergeTest.hpp"
+#include "support/text.hpp"
 
 namespace
 {
+
+/// An adapter of the host's own, which notes its commits.
+class NotingAdapter : public vclink::git::GitAdapter
+{
+  public:
+    using GitAdapter::GitAdapter;
+    void commit(const upath &path, const ustring &message) override
+    {
+        EXPECT_EQ(path.string(), ustring());
+        EXPECT_TRUE(path.native());
+        messages.push_back(vclink::test::asUtf8(message));
+        GitAdapter::commit(path, message);
+    }
+
+    std::vector<std::string> messages;
+};
 
 /// What a merge commit says.
 class MergeCommit : public vclink::test::MergeTest
@@ -58,6 +77,16 @@ TEST_F(MergeCommit, NamesABranchThatIsNoAsciiOrNoUtf8)
         EXPECT_EQ(message(), "Merge branch '" + name + "'");
         repository_.git({"reset", "--quiet", "--hard", base});
     }
+}
+
+TEST_F(MergeCommit, IsMadeByTheAdaptersOwnOperation)
+{
+    diverge(writing("ours", "x"), writing("theirs", "x"));
+    NotingAdapter adapter(vclink::test::asPath(repository_.path()),
+                          std::static_pointer_cast<vclink::ApplicationInteractor>(interactor_));
+    vclink::git::BranchManager::create(adapter)->merge("topic");
+    EXPECT_EQ(adapter.messages, std::vector<std::string>{"Merge branch 'topic'"});
+    EXPECT_EQ(message(), "Merge branch 'topic'");
 }
 
 TEST_F(MergeCommit, IsCommittedByThePersonOfTheConfiguration)

@@ -27,10 +27,6 @@ class RareConflicts : public vclink::test::MergeTest
             repository_.symlink(target, name);
         };
     }
-    std::function<void()> moving(const std::string &from, const std::string &to) const
-    {
-        return [=] { repository_.git({"mv", from, to}); };
-    }
     /// Expects these conflicts and files, and something else of git. "~theirs" behind a name stands
     /// for the id of the branch.
     void expectUnlikeGit(const std::vector<std::string> &stages, std::vector<std::string> files)
@@ -159,10 +155,7 @@ TEST_F(RareConflicts, OfAFolderThatTheyRenamed)
 
 TEST_F(RareConflicts, OfASubmodule)
 {
-    auto inner = makeRepository("inner");
-    inner.commitAll("inner 1");
-    repository_.git({"submodule", "--quiet", "add", inner.path().string(), "module"});
-    repository_.commitAll("module");
+    auto inner = addModule();
     const std::string base = inner.line({"rev-parse", "HEAD"});
     inner.git({"checkout", "--quiet", "-b", "ours"});
     inner.commitAll("ours");
@@ -185,24 +178,8 @@ TEST_F(RareConflicts, OfASubmodule)
 
 TEST_F(RareConflicts, OfCrissCrossHistories)
 {
-    makeBranch("topic", writing("file", "theirs 1\n"));
-    writing("other", "ours 1\n")();
-    repository_.commitAll("ours 1");
-    const std::string ours = idOf("main");
-    const std::string theirs = idOf("topic");
-    const auto merged = [this](const std::string &name)
-    {
-        repository_.git(
-            {"-c", "user.name=x", "-c", "user.email=x@y", "merge", "--quiet", "--no-edit", name});
-    };
-    merged(theirs);
-    writing("file", "ours 2\n")();
-    repository_.commitAll("ours 2");
-    repository_.git({"checkout", "--quiet", "topic"});
-    merged(ours);
-    writing("file", "theirs 2\n")();
-    repository_.commitAll("theirs 2");
-    repository_.git({"checkout", "--quiet", "main"});
+    diverge(writing("other", "ours 1\n"), writing("file", "theirs 1\n"));
+    crissCross(writing("file", "ours 2\n"), writing("file", "theirs 2\n"));
     expectAsGit();
     EXPECT_THAT(conflicts(), ElementsAre("1 file", "2 file", "3 file"));
 }

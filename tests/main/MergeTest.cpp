@@ -40,6 +40,7 @@ RepositoryState::Entries withoutLabels(RepositoryState::Entries entries)
     for (auto &[name, content] : entries)
     {
         cutLabels(content, "<<<<<<< ");
+        cutLabels(content, "||||||| ");
         cutLabels(content, ">>>>>>> ");
     }
     return entries;
@@ -131,11 +132,39 @@ std::function<void()> MergeTest::writing(const std::string &name, const std::str
     return [=] { repository_.write(name, bytes); };
 }
 
+std::function<void()> MergeTest::moving(const std::string &from, const std::string &to) const
+{
+    return [=] { repository_.git({"mv", from, to}); };
+}
+
 void MergeTest::diverge(const std::function<void()> &ours, const std::function<void()> &theirs)
 {
     makeBranch("topic", theirs);
     ours();
     repository_.commitAll("on main");
+}
+
+void MergeTest::crissCross(const std::function<void()> &ours, const std::function<void()> &theirs)
+{
+    const std::string first = idOf("main");
+    repository_.git({"merge", "--quiet", "--no-edit", "topic"});
+    ours();
+    repository_.commitAll("on main again");
+    repository_.git({"checkout", "--quiet", "topic"});
+    repository_.git({"merge", "--quiet", "--no-edit", first});
+    theirs();
+    repository_.commitAll("on topic again");
+    repository_.git({"checkout", "--quiet", "main"});
+    ASSERT_EQ(splitLines(repository_.git({"merge-base", "--all", "main", "topic"})).size(), 2U);
+}
+
+GitRepository MergeTest::addModule()
+{
+    auto inner = makeRepository("inner");
+    inner.commitAll("inner 1");
+    repository_.git({"submodule", "--quiet", "add", inner.path().string(), "module"});
+    repository_.commitAll("module");
+    return inner;
 }
 
 GitRepository MergeTest::makeTwin() const

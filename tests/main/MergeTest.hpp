@@ -50,8 +50,16 @@ class MergeTest : public BranchTest
                     const std::string &start = "main");
     /// What writes a whole file of the working copy.
     std::function<void()> writing(const std::string &name, const std::string &bytes) const;
+    /// What gives a file of the working copy another name.
+    std::function<void()> moving(const std::string &from, const std::string &to) const;
     /// Has `ours` committed on main and `theirs` on the new branch "topic".
     void diverge(const std::function<void()> &ours, const std::function<void()> &theirs);
+    /// After diverge(): has each branch merge what the other has so far, so that there are two
+    /// merge bases, and commit one more change.
+    void crissCross(const std::function<void()> &ours, const std::function<void()> &theirs);
+    /// Has the submodule "module" committed.
+    /// @return the repository that it is cloned from, with one commit
+    GitRepository addModule();
     /// A copy of the working copy as it is now, in the test's folder.
     GitRepository makeTwin() const;
     /// What `git merge` makes of a twin.

@@ -3,6 +3,7 @@
 #include <string>
 
 #include <git2.h>
+#include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include "MergeTest.hpp"
@@ -79,9 +80,10 @@ TEST_F(ThreeWayConflicts, OfAFileThatBothSidesMadeBinaryLeavesOurs)
 
 TEST_F(ThreeWayConflicts, WithTheStyleOfThreeSidesIsAsInGit)
 {
-    repository_.git({"config", "merge.conflictStyle", "merge"});
+    repository_.git({"config", "merge.conflictStyle", "diff3"});
     diverge(writing("file", "ours\n"), writing("file", "theirs\n"));
     expectConflictsAsGit({"1 file", "2 file", "3 file"});
+    EXPECT_THAT(repository_.read("file"), testing::HasSubstr("\n||||||| first\n1\n2\n"));
 }
 
 class RefusedThreeWayMerge : public vclink::test::MergeTest

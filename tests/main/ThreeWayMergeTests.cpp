@@ -103,21 +103,14 @@ TEST_F(ThreeWayMerge, OfTheSameModeTakesIt)
 
 TEST_F(ThreeWayMerge, OfARenameTakesTheOtherSidesChangeAlong)
 {
-    diverge(
-        [this] {
-            repository_.git({"mv", "file", "moved"});
-        },
-        writing("file", "1\n2\n3\n4\n5\n6\n7\n8\ntheirs\n"));
+    diverge(moving("file", "moved"), writing("file", "1\n2\n3\n4\n5\n6\n7\n8\ntheirs\n"));
     expectCleanAsGit();
     EXPECT_EQ(repository_.read("moved"), "1\n2\n3\n4\n5\n6\n7\n8\ntheirs\n");
 }
 
 TEST_F(ThreeWayMerge, OfTheirRenameTakesOurChangeAlong)
 {
-    diverge(writing("file", "ours\n2\n3\n4\n5\n6\n7\n8\n9\n"),
-            [this] {
-                repository_.git({"mv", "file", "moved"});
-            });
+    diverge(writing("file", "ours\n2\n3\n4\n5\n6\n7\n8\n9\n"), moving("file", "moved"));
     expectCleanAsGit();
     EXPECT_FALSE(std::filesystem::exists(repository_ / "file"));
 }
@@ -162,19 +155,13 @@ TEST_F(ThreeWayMerge, OfTheSameRenameWithDifferentChangesIsAConflict)
 
 TEST_F(ThreeWayMerge, OfRenamesOfDifferentFilesHasBoth)
 {
-    diverge(
-        [this] {
-            repository_.git({"mv", "file", "ours"});
-        },
-        [this] {
-            repository_.git({"mv", "other", "theirs"});
-        });
+    diverge(moving("file", "ours"), moving("other", "theirs"));
     expectCleanAsGit();
 }
 
 TEST_F(ThreeWayMerge, OfACaseOnlyRenameTakesIt)
 {
-    diverge(writing("other", "ours\n"), [this] { repository_.git({"mv", "file", "FILE"}); });
+    diverge(writing("other", "ours\n"), moving("file", "FILE"));
     expectCleanAsGit();
     EXPECT_TRUE(std::filesystem::exists(repository_ / "FILE"));
     EXPECT_FALSE(std::filesystem::exists(repository_ / "file"));
@@ -182,10 +169,7 @@ TEST_F(ThreeWayMerge, OfACaseOnlyRenameTakesIt)
 
 TEST_F(ThreeWayMerge, OfACaseOnlyRenameTakesOurChangeAlong)
 {
-    diverge(writing("file", "ours\n2\n3\n4\n5\n6\n7\n8\n9\n"),
-            [this] {
-                repository_.git({"mv", "file", "FILE"});
-            });
+    diverge(writing("file", "ours\n2\n3\n4\n5\n6\n7\n8\n9\n"), moving("file", "FILE"));
     expectCleanAsGit();
 }
 
@@ -198,28 +182,9 @@ TEST_F(ThreeWayMerge, OfSymbolicLinksOfOneSideTakesThem)
 
 TEST_F(ThreeWayMerge, OfCrissCrossHistoriesIsAsInGit)
 {
-    // Two bases: each branch has merged the other's first commit.
-    makeBranch("topic", writing("theirs", "1\n"));
-    writing("ours", "1\n")();
-    repository_.commitAll("ours 1");
-    const std::string ours = idOf("main");
-    const std::string theirs = idOf("topic");
-    const auto merged = [this](const std::string &name)
-    {
-        repository_.git(
-            {"-c", "user.name=x", "-c", "user.email=x@y", "merge", "--quiet", "--no-edit", name});
-    };
-    merged(theirs);
-    writing("file", "ours\n2\n3\n4\n5\n6\n7\n8\n9\n")();
-    repository_.commitAll("ours 2");
-    repository_.git({"checkout", "--quiet", "topic"});
-    merged(ours);
-    writing("file", "1\n2\n3\n4\n5\n6\n7\n8\ntheirs\n")();
-    repository_.commitAll("theirs 2");
-    repository_.git({"checkout", "--quiet", "main"});
-    ASSERT_EQ(
-        vclink::test::splitLines(repository_.git({"merge-base", "--all", "main", "topic"})).size(),
-        2U);
+    diverge(writing("ours", "1\n"), writing("theirs", "1\n"));
+    crissCross(writing("file", "ours\n2\n3\n4\n5\n6\n7\n8\n9\n"),
+               writing("file", "1\n2\n3\n4\n5\n6\n7\n8\ntheirs\n"));
     expectCleanAsGit();
 }
 
@@ -246,10 +211,7 @@ TEST_F(ThreeWayMerge, OfABranchThatAnOctopusHoldsAlreadyDoesNothing)
 
 TEST_F(ThreeWayMerge, OfASubmoduleOfOneSideTakesItsCommit)
 {
-    auto inner = makeRepository("inner");
-    inner.commitAll("inner 1");
-    repository_.git({"submodule", "--quiet", "add", inner.path().string(), "module"});
-    repository_.commitAll("module");
+    auto inner = addModule();
     inner.commitAll("inner 2");
     const std::string second = inner.line({"rev-parse", "HEAD"});
     const GitRepository module(repository_ / "module");

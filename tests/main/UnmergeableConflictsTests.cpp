@@ -241,6 +241,37 @@ TEST_F(UnmergeableConflicts, KeepOurMode)
               std::filesystem::perms::none);
 }
 
+TEST_F(UnmergeableConflicts, OfLinksAreOurs)
+{
+    attributes("* -merge\n");
+    const auto linking = [this](const std::string &target)
+    {
+        repository_.remove("file");
+        repository_.symlink(target, "file");
+    };
+    linking("ancestor");
+    repository_.commitAll("link");
+    diverge([&] { linking("ours"); }, [&] { linking("theirs"); });
+    expectConflicts("topic");
+    EXPECT_EQ(std::filesystem::read_symlink(repository_ / "file"), "ours");
+    expectStages("file");
+}
+
+/// libgit2 has put our file aside, and can't put it into the folder's place.
+TEST_F(UnmergeableConflicts, WithAFolderOfTheirsInTheirPlaceTellThatInPlaceOfTheConflict)
+{
+    attributes("new -merge\n");
+    diverge([this] { repository_.write("new", "ours\n"); },
+            [this] { repository_.write("new/inside", "theirs\n"); });
+    const std::string head = idOf("HEAD");
+    EXPECT_THAT(failureOfMerge("topic"), testing::HasSubstr("Is a directory"));
+    EXPECT_THAT(conflicts(), ElementsAre("2 new"));
+    EXPECT_EQ(repository_.read("new~HEAD"), "ours\n");
+    EXPECT_EQ(repository_.read("new/inside"), "theirs\n");
+    EXPECT_EQ(idOf("HEAD"), head);
+    EXPECT_EQ(branches().getRepositoryState(), "Conflicts");
+}
+
 TEST_F(UnmergeableConflicts, LeaveOtherFilesAlone)
 {
     attributes("*.bin -merge\n");
@@ -274,6 +305,14 @@ TEST_F(UnmergeableConflicts, FollowTheAttributesOfAFolder)
     expectConflicts("topic");
     EXPECT_TRUE(isOurs("folder/a.bin"));
     EXPECT_TRUE(hasMarkers("a.bin"));
+}
+
+TEST_F(UnmergeableConflicts, FollowTheAttributesOfAFileThatIsNotTracked)
+{
+    divergeIn({"file"});
+    repository_.write(".gitattributes", "file -merge\n");
+    expectConflicts("topic");
+    EXPECT_TRUE(isOurs("file"));
 }
 
 TEST_F(UnmergeableConflicts, FollowTheAttributesOfTheRepositoryAlone)
