@@ -13,6 +13,7 @@
 #include "names.hpp"
 #include "refusals.hpp"
 #include "states.hpp"
+#include "unfinished.hpp"
 
 namespace vclink::shell
 {
@@ -48,8 +49,9 @@ class CommitCommand : public Command
                        ->type_name("MESSAGE")
                        ->option_text("MESSAGE")
                        ->required();
-        line.add_flag("--as-is", takesConflicts_,
-                      "Commit files in conflict as they stand, markers included");
+        line.add_flag("--as-is", takesAll_,
+                      "Commit files in conflict as they stand, markers included, and in the midst\n"
+                      "of a rebase, a bisection or a series of picked commits, which ends it");
         line.footer(
             "All changes to tracked files are in the commit, staged or not, and what was added "
             "or removed.\nA merge that is under way is ended by it. The identity is that of "
@@ -62,8 +64,9 @@ class CommitCommand : public Command
         CMAdapter &adapter = session.adapter();
         const upath &root = adapter.getRootFolder();
         const FileStateMap states = adapter.getFolderStates(root);
-        if (!takesConflicts_)
+        if (!takesAll_)
         {
+            refuseHalfWay(adapter);
             refuseConflicts(states, root);
         }
         adapter.commit(root, fl::i18n::utf8_to_ustring(message_->results().front()));
@@ -76,7 +79,7 @@ class CommitCommand : public Command
 
   private:
     const CLI::Option *message_ = nullptr;
-    bool takesConflicts_ = false;
+    bool takesAll_ = false;
 };
 
 } // namespace

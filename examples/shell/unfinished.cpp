@@ -1,0 +1,91 @@
+// SPDX-License-Identifier: MIT
+#include "unfinished.hpp"
+
+#include <filesystem>
+#include <fstream>
+#include <string>
+
+#include "failures.hpp"
+#include "names.hpp"
+#include "vclink/git/BranchManager.hpp"
+
+namespace vclink::shell
+{
+namespace
+{
+
+namespace fs = std::filesystem;
+
+/// What is done commit by commit, or step by step.
+struct Operation
+{
+    /// The back end's word for it.
+    const char *state;
+    const char *name;
+    const char *wayOn;
+};
+
+constexpr const char *goOnRebasing = "Go on with \"git rebase --continue\"";
+constexpr Operation operations[] = {
+    {"Bisecting", "a bisection", "End it with \"git bisect reset\""},
+    {"Rebase", "a rebase", goOnRebasing},
+    {"Rebase interactive", "a rebase", goOnRebasing},
+    {"Rebase w/merge", "a rebase", goOnRebasing},
+    {"Apply mailbox", "the application of a mailbox", "Go on with \"git am --continue\""},
+    {"Rebase/Apply mailbox", "a rebase or the application of a mailbox",
+     "Go on with \"git rebase --continue\", or \"git am --continue\""}};
+/// To the back end one commit that is picked and several are the same.
+constexpr Operation series = {"", "a series of picked or reverted commits",
+                              "Go on with \"git cherry-pick --continue\", or \"git revert "
+                              "--continue\""};
+
+/// Where Git keeps the state of a working copy.
+fs::path stateFolder(const fs::path &root)
+{
+    const fs::path place = root / ".git";
+    std::ifstream file(place);
+    const std::string key = "gitdir: ";
+    std::string line;
+    const bool isElsewhere = std::getline(file, line) && line.rfind(key, 0) == 0;
+    return isElsewhere ? root / line.substr(key.size()) : place;
+}
+
+/// Whether commits are still to be picked or reverted after the one that is under way.
+bool isInSeries(const fs::path &root)
+{
+    std::ifstream steps(stateFolder(root) / "sequencer" / "todo");
+    std::size_t count = 0;
+    for (std::string step; std::getline(steps, step);)
+    {
+        count += step.empty() ? 0 : 1;
+    }
+    return count > 1;
+}
+
+const Operation *findOperation(CMAdapter &adapter)
+{
+    const std::string state = git::BranchManager::create(adapter)->getRepositoryState();
+    for (const Operation &operation : operations)
+    {
+        if (state == operation.state)
+        {
+            return &operation;
+        }
+    }
+    return isInSeries(nativePath(adapter.getRootFolder())) ? &series : nullptr;
+}
+
+} // namespace
+
+void refuseHalfWay(CMAdapter &adapter)
+{
+    if (const Operation *const operation = findOperation(adapter))
+    {
+        throw ShellFailure(std::string("Nothing was committed, because ") + operation->name +
+                           " is under way.\nThe commit would end it, and drop what is left of it; "
+                           "with --as-is it is made all the same.\n" +
+                           operation->wayOn + '.');
+    }
+}
+
+} // namespace vclink::shell
