@@ -1,0 +1,137 @@
+// SPDX-License-Identifier: MIT
+#include <algorithm>
+#include <array>
+#include <iostream>
+#include <iterator>
+#include <map>
+#include <set>
+#include <string>
+#include <utility>
+#include <vector>
+
+#include <git2/errors.h>
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include "../util/NothingLeft.hpp"
+#include "FaultTest.hpp"
+#include "LibGit2Faults.hpp"
+#include "error/errorUtil/callbackException.hpp"
+#include "expectedOutcomes.hpp"
+
+namespace
+{
+
+using vclink::test::FaultSite;
+using vclink::test::LibGit2Fault;
+using vclink::test::LibGit2Faults;
+using vclink::test::outcomeOf;
+using vclink::test::When;
+
+/// A code without a meaning of its own, and those that mean something to the library.
+constexpr std::array<int, 6> codes{GIT_ERROR,    GIT_ENOTFOUND,      GIT_EUSER,
+                                   GIT_ITEROVER, GIT_EMERGECONFLICT, GIT_PASSTHROUGH};
+
+std::string nameOf(const FaultSite &site)
+{
+    return site.function + " (" + std::to_string(site.occurrence) + ") " +
+           (site.fault.when == When::Before ? "before" : "after") + " with " +
+           std::to_string(site.fault.code);
+}
+
+class FailingLibGit2Call : public vclink::test::FaultTest
+{
+  protected:
+    /// The sites of the calls that give a code, each once, without a fault.
+    std::vector<FaultSite> findSites() const
+    {
+        const auto action = trial_.begin();
+        const LibGit2Faults noting;
+        outcomeOf(action);
+        std::map<std::string, int> occurrences;
+        std::vector<FaultSite> sites;
+        for (const auto &function : noting.calls())
+            sites.push_back({GetParam().name,
+                             function,
+                             ++occurrences[function],
+                             {sites.size() + 1, 0, When::Before}});
+        return sites;
+    }
+
+    void fail(const FaultSite &site) const
+    {
+        SCOPED_TRACE(nameOf(site));
+        const auto action = trial_.begin();
+        std::string outcome;
+        {
+            const vclink::test::NothingLeft nothingLeft(environment().temporary());
+            const LibGit2Faults faults(site.fault);
+            outcome = outcomeOf(action);
+            EXPECT_EQ(faults.openHandles(), std::vector<std::string>());
+            EXPECT_EQ(faults.starts(), 0);
+        }
+        EXPECT_EQ(outcome, vclink::test::expectedOutcome(site, trial_.normalOutcome()));
+        // The codes differ in what comes out, hardly in what is left.
+        if (site.fault.code == codes.front() || vclink::test::wantsAllFaults())
+            trial_.expectSound();
+        if (vclink::test::isUnexamined(site.operation, site.function))
+        {
+            EXPECT_EQ(trial_.gist(), trial_.normalGist());
+        }
+        trial_.expectWorksAgain(action);
+    }
+};
+
+TEST_P(FailingLibGit2Call, ComesOutAndLeavesNothing)
+{
+    const auto sites = findSites();
+    std::size_t runs = 0;
+    for (FaultSite site : sites)
+    {
+        for (const auto when : {When::Before, When::After})
+        {
+            if (when == When::Before && vclink::test::isUnexamined(site.operation, site.function))
+                continue;
+            for (const int code : codes)
+            {
+                site.fault.when = when;
+                site.fault.code = code;
+                fail(site);
+                ++runs;
+            }
+        }
+    }
+    std::cout << "call sites failed: " << sites.size() << ", in " << runs << " runs\n";
+}
+
+class LibGit2Functions : public vclink::test::GitTest
+{
+  protected:
+    vclink::test::LibGit2Session session_{environment()};
+};
+
+TEST_F(LibGit2Functions, AreAllCalledByTheOperations)
+{
+    std::set<std::string> called;
+    for (const auto &operation : vclink::test::allOperations())
+    {
+        const vclink::test::Trial trial(operation, folder() / operation.name, environment());
+        const auto action = trial.begin();
+        const LibGit2Faults noting;
+        outcomeOf(action);
+        called.insert(noting.functions().begin(), noting.functions().end());
+    }
+    std::vector<std::string> notCalled;
+    const auto imported = vclink::test::wrappedFunctions();
+    std::set_difference(imported.begin(), imported.end(), called.begin(), called.end(),
+                        std::back_inserter(notCalled));
+    // No operation asks for the features; a remote that is a path asks for no credentials.
+    EXPECT_THAT(notCalled,
+                testing::ElementsAre("git_credential_ssh_key_from_agent", "git_libgit2_features"));
+    std::cout << "functions of libgit2: " << imported.size() << '\n';
+}
+
+INSTANTIATE_TEST_SUITE_P(Of, FailingLibGit2Call, testing::ValuesIn(vclink::test::allOperations()),
+                         vclink::test::nameOfTest);
+
+} // namespace

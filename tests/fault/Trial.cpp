@@ -1,0 +1,117 @@
+// SPDX-License-Identifier: MIT
+#include "Trial.hpp"
+
+#include <algorithm>
+#include <cstdlib>
+#include <filesystem>
+#include <utility>
+
+#include <gtest/gtest.h>
+
+#include "support/text.hpp"
+
+namespace vclink::test
+{
+namespace
+{
+
+namespace fs = std::filesystem;
+
+/// Objects, which nobody writes to, are linked: this runs before every fault.
+void copyTree(const fs::path &source, const fs::path &target)
+{
+    fs::remove_all(target);
+    fs::create_directories(target);
+    for (const auto &entry : fs::directory_iterator(source))
+    {
+        const fs::path copy = target / entry.path().filename();
+        const bool isFolder = !entry.is_symlink() && entry.is_directory();
+        if (isFolder && entry.path().filename() != "objects")
+            copyTree(entry.path(), copy);
+        else if (isFolder)
+            fs::copy(entry.path(), copy,
+                     fs::copy_options::recursive | fs::copy_options::create_hard_links);
+        else
+            fs::copy(entry.path(), copy, fs::copy_options::copy_symlinks);
+    }
+}
+
+bool begins(const std::string &text, const std::string &beginning)
+{
+    return text.compare(0, beginning.size(), beginning) == 0;
+}
+
+bool isDone(const std::string &outcome)
+{
+    return begins(outcome, "done");
+}
+
+} // namespace
+
+bool wantsAllFaults()
+{
+    return std::getenv("VCLINK_ALL_FAULTS") != nullptr;
+}
+
+Trial::Trial(const Operation &operation, fs::path folder, const HermeticEnvironment &environment)
+    : operation_(operation), folder_(std::move(folder)), home_(environment.home()),
+      repository_(GitRepository::init(folder_ / "subject/repository"))
+{
+    // For the operations that make an identity of it; the environment is put back by its owner.
+    ::setenv("USER", "builder", 1);
+    operation_.prepare(repository_);
+    copyTree(folder_ / "subject", folder_ / "saved");
+    normalOutcome_ = outcomeOf(begin());
+    normalGist_ = gist();
+}
+
+Action Trial::begin() const
+{
+    copyTree(folder_ / "saved", folder_ / "subject");
+    GitRepository(home_).write(".gitconfig", "[core]\n\tpreloadIndex = false\n");
+    const auto interactor = std::make_shared<TestInteractor>();
+    const auto adapter = std::make_shared<git::GitAdapter>(
+        asPath(repository_.path()), std::static_pointer_cast<ApplicationInteractor>(interactor));
+    return operation_.make({repository_, interactor, adapter});
+}
+
+std::string Trial::gist() const
+{
+    const auto line = [this](const std::vector<std::string> &arguments)
+    { return repository_.tryGit(arguments).output; };
+    return line({"status", "--porcelain=v2", "--untracked-files=all"}) +
+           line({"ls-files", "--stage"}) + line({"symbolic-ref", "HEAD"}) +
+           line({"for-each-ref", "--format=%(refname) %(tree)"}) +
+           line({"log", "--all", "--format=%s, %an, %T"}) + line({"rev-parse", "MERGE_HEAD"}) +
+           GitRepository(home_).read(".gitconfig");
+}
+
+void Trial::expectSound() const
+{
+    std::vector<fs::path> repositories{repository_.path()};
+    if (fs::exists(folder_ / "subject/origin"))
+        repositories.push_back(folder_ / "subject/origin");
+    for (const auto &path : repositories)
+    {
+        const auto checked =
+            GitRepository(path).tryGit({"fsck", "--strict", "--no-dangling", "--no-progress"});
+        EXPECT_TRUE(checked.succeeded()) << checked.output << checked.errors;
+    }
+    for (const auto &entry : fs::recursive_directory_iterator(folder_ / "subject"))
+        EXPECT_NE(entry.path().extension(), ".lock") << entry.path();
+}
+
+void Trial::expectWorksAgain(const Action &action) const
+{
+    std::string outcome = outcomeOf(action);
+    if (isDone(outcome) || outcome == normalOutcome_)
+        return;
+    EXPECT_FALSE(operation_.refusal.empty()) << outcome;
+    EXPECT_TRUE(begins(outcome, operation_.refusal)) << outcome;
+    for (const auto &command : operation_.clearing)
+        repository_.git(command);
+    outcome = outcomeOf(action);
+    EXPECT_EQ(outcome, normalOutcome_);
+}
+
+} // namespace vclink::test

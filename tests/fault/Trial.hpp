@@ -1,0 +1,63 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <filesystem>
+#include <string>
+
+#include "Operation.hpp"
+#include "support/GitRepository.hpp"
+#include "support/HermeticEnvironment.hpp"
+
+namespace vclink::test
+{
+
+/// Whether every fault is asked for, and every check after it, rather than the share that a test
+/// run has the time for: the environment variable VCLINK_ALL_FAULTS is set.
+bool wantsAllFaults();
+
+/// An operation that is tried again and again, from the same beginning each time. libgit2 runs.
+class Trial
+{
+  public:
+    /// Has the operation run once, with nothing failing.
+    /// @param folder is made; what stands in the home folder is written over
+    Trial(const Operation &operation, std::filesystem::path folder,
+          const HermeticEnvironment &environment);
+
+    /// Puts the working copy and the user's configuration back to where they began.
+    /// @return the operation on them, to be called
+    Action begin() const;
+    const GitRepository &repository() const noexcept
+    {
+        return repository_;
+    }
+
+    /// What the working copy and the repository hold, for comparison, without what differs from run
+    /// to run.
+    std::string gist() const;
+    /// How the operation ends when nothing fails, and what it leaves.
+    const std::string &normalOutcome() const noexcept
+    {
+        return normalOutcome_;
+    }
+    const std::string &normalGist() const noexcept
+    {
+        return normalGist_;
+    }
+
+    /// Expects a repository in order, without a lock.
+    void expectSound() const;
+    /// Expects that the operation does its work when it is called again, at once or, where the
+    /// first call left something behind, after git has cleared it away.
+    void expectWorksAgain(const Action &action) const;
+
+  private:
+    const Operation &operation_;
+    std::filesystem::path folder_;
+    std::filesystem::path home_;
+    GitRepository repository_;
+    std::string normalOutcome_;
+    std::string normalGist_;
+};
+
+} // namespace vclink::test

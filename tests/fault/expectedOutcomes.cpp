@@ -1,0 +1,171 @@
+// SPDX-License-Identifier: MIT
+#include "expectedOutcomes.hpp"
+
+#include <algorithm>
+#include <iterator>
+#include <vector>
+
+#include <git2/errors.h>
+
+#include "Operation.hpp"
+#include "fl/i18n/MessageCatalog.hpp"
+#include "fl/i18n/VkLocale.hpp"
+#include "support/text.hpp"
+#include "vclink/git/messageIdentifiers.hpp"
+
+namespace vclink::test
+{
+namespace
+{
+
+constexpr int any = 0;
+
+/// A failing call that does not end its operation with an exception of its own.
+struct Tolerance
+{
+    /// how the names of the operations begin
+    std::string operations;
+    std::string function;
+    /// which of the function's calls, and with which code
+    int occurrence = any;
+    int code = any;
+    std::string outcome;
+};
+
+/// The function and how the names of its operations begin.
+struct Unexamined
+{
+    std::string operations;
+    std::string function;
+};
+
+bool begins(const std::string &text, const std::string &beginning)
+{
+    return text.compare(0, beginning.size(), beginning) == 0;
+}
+
+bool isMerge(const std::string &operation)
+{
+    return begins(operation, "merge");
+}
+
+std::string textOf(const resource_core::BaseMsgID &message)
+{
+    return asUtf8(fl::i18n::MessageCatalog::get_message(message, fl::i18n::VkLocale::global()));
+}
+
+std::string failureIn(const std::string &operation, int code, int errorClass,
+                      const std::string &text)
+{
+    using shared_vclink::git::LibGit2Error;
+    return isMerge(operation) ? mergeFailure(textOf(LibGit2Error(code, errorClass, asUtf16(text))))
+                              : failure(code, errorClass, text);
+}
+
+const std::vector<Unexamined> &allUnexamined()
+{
+    static const std::vector<Unexamined> functions{
+        {"", "git_libgit2_init"},
+        {"", "git_libgit2_shutdown"},
+        {"", "git_libgit2_version"},
+        {"", "git_merge_driver_register"},
+        {"", "git_merge_driver_unregister"},
+        {"", "git_status_foreach_ext"},
+        {"", "git_attr_cache_flush"},
+        {"", "git_oid_cpy"},
+        {"", "git_oid_fmt"},
+        {"merge", "git_merge_analysis"},
+        {"merge", "git_attr_get"},
+    };
+    return functions;
+}
+
+std::vector<Tolerance> tolerancesOf(const std::string &operation, const std::string &normal)
+{
+    const std::string otherTip = failureIn(operation, GIT_EMODIFIED, GIT_ERROR_OBJECT,
+                                           "failed to create commit: current tip is not the first "
+                                           "parent");
+    const std::string hasConflicts = mergeFailure(textOf(shared_vclink::git::HasConflicts()));
+    const std::string badState =
+        mergeFailure(textOf(shared_vclink::git::UnableToMergeBadRepositoryState()));
+    const std::string linkInTheWay = failure(
+        GIT_ECONFLICT, GIT_ERROR_CHECKOUT, "the symbolic link 'sub' is in the way of the checkout");
+    return {
+        // Only a missing folder is no failure of a probe.
+        {"isAdapterFor", "git_repository_open_ext", any, GIT_ENOTFOUND, "done: 0"},
+        // A HEAD that can't be read makes the commit a first one, which libgit2 refuses.
+        {"commitFirst", "git_reference_dwim", any, any, normal},
+        {"commitUnreadable", "git_reference_dwim", any, any, normal},
+        {"commitUnreadable", "git_commit_lookup", any, any, normal},
+        {"commit", "git_reference_dwim", 1, any, otherTip},
+        {"commit", "git_commit_lookup", 1, any, otherTip},
+        // A state that is none of a merge's is not looked at.
+        {"commit", "git_repository_state", any, any, normal},
+        // The identity comes from the environment then.
+        {"", "git_signature_default", any, GIT_ENOTFOUND, normal},
+        // A file that can't be found in the index is looked at in the working tree.
+        {"commit", "git_index_find", any, any, normal},
+        // The text of the failure is the injected one then.
+        {"commit", "git_error_set_str", any, any, failure(GIT_ERROR, GIT_ERROR_OS, injectedText)},
+        // Without a HEAD the files are taken out of the index.
+        {"revert", "git_revparse_single", any, any, normal},
+        // The end of a list.
+        {"getLocalBranches", "git_branch_next", 1, GIT_ITEROVER, "done: "},
+        {"getLocalBranches", "git_branch_next", 2, GIT_ITEROVER, "done: refs/heads/main "},
+        {"getLocalBranches", "git_branch_next", 3, GIT_ITEROVER, normal},
+        {"getRemoteBranches", "git_branch_next", 1, GIT_ITEROVER, "done: "},
+        {"getRemoteBranches", "git_branch_next", 2, GIT_ITEROVER, normal},
+        {"merge", "git_index_conflict_next", any, GIT_ITEROVER, normal},
+        // A link is in the way where it is not known that the folder behind it stays.
+        {"switchBranchUnderLink", "git_revparse_single", 2, any, linkInTheWay},
+        {"switchBranchUnderLink", "git_revparse_single", 3, any, linkInTheWay},
+        {"switchBranchUnderLink", "git_oid_equal", any, any, normal},
+        // A state without a name.
+        {"getRepositoryState", "git_repository_state", any, any, "done: "},
+        // Any state but the normal one refuses the merge, any answer but no means conflicts.
+        {"merge", "git_repository_state", 1, any, badState},
+        {"merge", "git_repository_state", 2, any, normal},
+        {"merge", "git_index_has_conflicts", any, any, hasConflicts},
+        // The first look-up chooses the words of the message, the second is the commit's.
+        {"merge", "git_reference_dwim", 1, any, normal},
+        {"merge", "git_reference_dwim", 2, any, otherTip},
+        {"merge", "git_commit_lookup", 1, any, otherTip},
+        // Without its command a driver leaves the file to libgit2's own merge.
+        {"mergeByTool", "git_config_get_entry", any, any, hasConflicts},
+        // No value is what the reads of the configuration make of every failure.
+        {"globalFilePath", "git_config_find_global", any, any, "done: nothing"},
+        {"read", "git_config_get_string_buf", any, any, "done: nothing"},
+    };
+}
+
+} // namespace
+
+bool isUnexamined(const std::string &operation, const std::string &function)
+{
+    const auto &all = allUnexamined();
+    return std::any_of(all.begin(), all.end(),
+                       [&](const Unexamined &entry) {
+                           return begins(operation, entry.operations) && function == entry.function;
+                       });
+}
+
+std::string expectedOutcome(const FaultSite &site, const std::string &normal)
+{
+    if (isUnexamined(site.operation, site.function))
+        return normal;
+    const auto tolerances = tolerancesOf(site.operation, normal);
+    const auto found = std::find_if(
+        tolerances.begin(), tolerances.end(),
+        [&site](const Tolerance &tolerance)
+        {
+            return begins(site.operation, tolerance.operations) &&
+                   site.function == tolerance.function &&
+                   (tolerance.occurrence == any || tolerance.occurrence == site.occurrence) &&
+                   (tolerance.code == any || tolerance.code == site.fault.code);
+        });
+    return found != tolerances.end()
+               ? found->outcome
+               : failureIn(site.operation, site.fault.code, GIT_ERROR_OS, injectedText);
+}
+
+} // namespace vclink::test

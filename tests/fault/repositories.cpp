@@ -1,0 +1,179 @@
+// SPDX-License-Identifier: MIT
+#include "repositories.hpp"
+
+namespace vclink::test
+{
+namespace
+{
+
+void configureIdentity(const GitRepository &repository)
+{
+    repository.git({"config", "user.name", "Test Person"});
+    repository.git({"config", "user.email", "person@example.com"});
+}
+
+void change(const GitRepository &repository)
+{
+    repository.write("file", "changed\n");
+    repository.remove("other");
+    repository.write("staged", "staged\n");
+    repository.add({"staged"});
+    repository.write("new", "new\n");
+}
+
+/// Both sides change "file".
+void divergeInFile(GitRepository &repository)
+{
+    repository.git({"checkout", "--quiet", "-b", "topic"});
+    repository.write("file", "theirs\n");
+    repository.commitAll("on topic");
+    repository.git({"checkout", "--quiet", "main"});
+    repository.write("file", "ours\n");
+    repository.commitAll("on main");
+}
+
+void makeConflictUnder(GitRepository &repository, const std::string &attributes)
+{
+    repository.write(".gitattributes", attributes);
+    makePlain(repository);
+    divergeInFile(repository);
+}
+
+} // namespace
+
+void makePlain(GitRepository &repository)
+{
+    configureIdentity(repository);
+    repository.write("file", "1\n2\n3\n");
+    repository.write("other", "other\n");
+    repository.write("sub/inside", "inside\n");
+    repository.commitAll("first");
+}
+
+void makeEmpty(GitRepository &repository)
+{
+    configureIdentity(repository);
+    repository.write("file", "1\n");
+    repository.add({"file"});
+}
+
+void makeChanged(GitRepository &repository)
+{
+    makePlain(repository);
+    change(repository);
+}
+
+void makeAnonymous(GitRepository &repository)
+{
+    makeChanged(repository);
+    repository.git({"config", "--unset", "user.name"});
+    repository.git({"config", "--unset", "user.email"});
+}
+
+void makeSparse(GitRepository &repository)
+{
+    makePlain(repository);
+    repository.git({"update-index", "--skip-worktree", "sub/inside"});
+    repository.remove("sub");
+    repository.remove("file");
+}
+
+void makeUnreadable(GitRepository &repository)
+{
+    makePlain(repository);
+    repository.remove("sub");
+    repository.symlink("sub", "sub");
+}
+
+void makeTypeChange(GitRepository &repository)
+{
+    makePlain(repository);
+    repository.remove("file");
+    repository.symlink("other", "file");
+    repository.add({"file"});
+}
+
+void makeBranches(GitRepository &repository)
+{
+    makePlain(repository);
+    repository.git({"checkout", "--quiet", "-b", "topic"});
+    repository.write("file", "theirs\n");
+    repository.write("added", "added\n");
+    repository.commitAll("on topic");
+    repository.git({"checkout", "--quiet", "main"});
+    repository.git({"update-ref", "refs/remotes/origin/main", "HEAD"});
+}
+
+void makeLinkedFolder(GitRepository &repository)
+{
+    makeBranches(repository);
+    repository.remove("sub");
+    repository.symlink("nowhere", "sub");
+}
+
+void makeUpToDate(GitRepository &repository)
+{
+    makeBranches(repository);
+    repository.git({"merge", "--quiet", "topic"});
+}
+
+void makeDiverged(GitRepository &repository)
+{
+    makeBranches(repository);
+    repository.write("other", "ours\n");
+    repository.commitAll("on main");
+}
+
+void makeMerging(GitRepository &repository)
+{
+    makeDiverged(repository);
+    repository.git({"merge", "--quiet", "--no-commit", "topic"});
+}
+
+void makeConflict(GitRepository &repository)
+{
+    makePlain(repository);
+    divergeInFile(repository);
+}
+
+void makeUnmergeableConflict(GitRepository &repository)
+{
+    makeConflictUnder(repository, "file -merge\n");
+}
+
+void makeConflictForTool(GitRepository &repository)
+{
+    makeConflictUnder(repository, "file merge=tool\n");
+    repository.git({"config", "merge.tool.driver", "cp %B %A"});
+}
+
+void makeConflicted(GitRepository &repository)
+{
+    makeConflict(repository);
+    repository.tryGit({"merge", "--quiet", "topic"});
+}
+
+void makeRemote(GitRepository &repository)
+{
+    makePlain(repository);
+    const std::string origin = repository.path().parent_path() / "origin";
+    repository.git({"clone", "--quiet", "--bare", ".", origin});
+    repository.git({"remote", "add", "origin", origin});
+    repository.write("file", "theirs\n");
+    repository.commitAll("on origin");
+    repository.git({"push", "--quiet", origin, "main"});
+    repository.git({"reset", "--quiet", "--hard", "HEAD~1"});
+    // So that the objects have to be fetched.
+    repository.git({"reflog", "expire", "--expire=now", "--all"});
+    repository.git({"gc", "--quiet", "--prune=now"});
+    repository.write("other", "ours\n");
+    repository.commitAll("here");
+}
+
+void makeAttributes(GitRepository &repository)
+{
+    makePlain(repository);
+    repository.write(".gitattributes", "file colour=blue\n");
+}
+
+} // namespace vclink::test

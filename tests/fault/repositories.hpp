@@ -1,0 +1,51 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <string>
+
+#include "support/GitRepository.hpp"
+
+/// What operations run on: each makes a working copy of a new repository.
+namespace vclink::test
+{
+
+/// "file", "other" and "sub/inside" in one commit on main, and an identity.
+void makePlain(GitRepository &repository);
+/// Nothing but an identity.
+void makeEmpty(GitRepository &repository);
+/// Plain, and a file of every state: "file" modified, "other" missing, "staged" added, "new"
+/// unversioned.
+void makeChanged(GitRepository &repository);
+/// Changed, without an identity in the configuration.
+void makeAnonymous(GitRepository &repository);
+/// Plain, and "file" gone from the working tree, "sub/inside" left out of it by a sparse checkout.
+void makeSparse(GitRepository &repository);
+/// Plain, and a link to itself in the place of "sub", so that "sub/inside" can't be looked at.
+void makeUnreadable(GitRepository &repository);
+/// Plain, and "file" staged as a link.
+void makeTypeChange(GitRepository &repository);
+/// Plain with the branch "topic", which changes "file"; the working tree is clean.
+void makeBranches(GitRepository &repository);
+/// Branches, with an untracked link in the place of "sub", which both branches have.
+void makeLinkedFolder(GitRepository &repository);
+/// Branches, with main where "topic" is.
+void makeUpToDate(GitRepository &repository);
+/// Branches, with another change of other files on main.
+void makeDiverged(GitRepository &repository);
+/// Diverged, and stopped in a merge without conflicts.
+void makeMerging(GitRepository &repository);
+/// Main and topic change the same line of "file", for which there is no tool.
+void makeConflict(GitRepository &repository);
+/// The same, "file" being one that must not hold markers.
+void makeUnmergeableConflict(GitRepository &repository);
+/// The same, a configured command merging the file.
+void makeConflictForTool(GitRepository &repository);
+/// Conflict, and stopped in its merge.
+void makeConflicted(GitRepository &repository);
+/// Plain with the remote "origin", a bare repository beside it; each of the two has a commit that
+/// the other lacks.
+void makeRemote(GitRepository &repository);
+/// Plain with attributes.
+void makeAttributes(GitRepository &repository);
+
+} // namespace vclink::test
