@@ -10,10 +10,11 @@ namespace
 
 /// How many allocations succeed before one fails; negative: none fails.
 int allocationsLeft = -1;
+int pauses = 0;
 
 void *allocate(std::size_t size) noexcept
 {
-    if (allocationsLeft >= 0 && allocationsLeft-- == 0)
+    if (pauses == 0 && allocationsLeft >= 0 && allocationsLeft-- == 0)
         return nullptr;
     return std::malloc(size != 0 ? size : 1);
 }
@@ -33,6 +34,16 @@ bool letAllAllocationsSucceed()
     const bool hasFailed = allocationsLeft < 0;
     allocationsLeft = -1;
     return hasFailed;
+}
+
+AllocationsSucceed::AllocationsSucceed() noexcept
+{
+    ++pauses;
+}
+
+AllocationsSucceed::~AllocationsSucceed()
+{
+    --pauses;
 }
 
 } // namespace vclink::test

@@ -13,4 +13,14 @@ void letAllocationsSucceed(int count);
 /// @return whether an allocation has failed
 bool letAllAllocationsSucceed();
 
+/// Lets all allocations succeed, and does not count them, while it lives.
+class AllocationsSucceed
+{
+  public:
+    AllocationsSucceed() noexcept;
+    AllocationsSucceed(const AllocationsSucceed &) = delete;
+    AllocationsSucceed &operator=(const AllocationsSucceed &) = delete;
+    ~AllocationsSucceed();
+};
+
 } // namespace vclink::test

@@ -1,0 +1,18 @@
+// SPDX-License-Identifier: MIT
+#include <dlfcn.h>
+
+#include "../main/FailingAllocations.hpp"
+
+/// Stands before boost::filesystem::path::compare, which must not raise and yet allocates up to
+/// release 1.76: there a failing allocation ends the process, whoever compares.
+extern "C" __attribute__((visibility("default"))) int comparePaths(const void *left,
+                                                                   const void *right) noexcept
+    __asm__("_ZNK5boost10filesystem4path7compareERKS1_");
+
+extern "C" int comparePaths(const void *left, const void *right) noexcept
+{
+    const vclink::test::AllocationsSucceed pause;
+    static auto *const compare = reinterpret_cast<int (*)(const void *, const void *)>(
+        ::dlsym(RTLD_NEXT, "_ZNK5boost10filesystem4path7compareERKS1_"));
+    return compare(left, right);
+}
