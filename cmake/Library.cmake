@@ -5,14 +5,18 @@ add_library(vclink_git_objects OBJECT)
 vclink_configure_target(vclink_git_objects)
 target_include_directories(vclink_git_objects PUBLIC
     ${PROJECT_SOURCE_DIR} ${PROJECT_SOURCE_DIR}/include)
-target_link_libraries(vclink_git_objects PUBLIC
-    vclink::host Boost::headers Boost::filesystem Boost::thread PkgConfig::libgit2)
+target_link_libraries(vclink_git_objects
+    PUBLIC vclink::host Boost::headers Boost::filesystem Boost::thread PkgConfig::libgit2
+    PRIVATE vclink_hardening)
+# Whole debug information, whatever the preset says: the packages of symbols and the report on the
+# binary interface are made from it.
+target_compile_options(vclink_git_objects PRIVATE $<$<CONFIG:RelWithDebInfo>:-g2>)
 
 add_library(vclink_git SHARED)
 add_library(vclink::git ALIAS vclink_git)
 vclink_configure_target(vclink_git)
 target_link_libraries(vclink_git
-    PRIVATE vclink_git_objects
+    PRIVATE vclink_git_objects $<BUILD_INTERFACE:vclink_hardening>
     PUBLIC vclink::host Boost::headers)
 target_include_directories(vclink_git PUBLIC
     $<BUILD_INTERFACE:${PROJECT_SOURCE_DIR}/include>
@@ -20,7 +24,7 @@ target_include_directories(vclink_git PUBLIC
 set_target_properties(vclink_git PROPERTIES
     VERSION ${PROJECT_VERSION}
     SOVERSION ${PROJECT_VERSION_MAJOR}
+    LINK_DEPENDS "${PROJECT_SOURCE_DIR}/cmake/exports.map"
     LIBRARY_OUTPUT_DIRECTORY "${VCLINK_STAGE_DIR}/${CMAKE_INSTALL_LIBDIR}")
-# clang's sanitizers leave their names to be found in the program.
 target_link_options(vclink_git PRIVATE
-    -Wl,--as-needed $<$<NOT:$<BOOL:${VCLINK_SANITIZE}>>:-Wl,--no-undefined>)
+    "LINKER:--version-script,${PROJECT_SOURCE_DIR}/cmake/exports.map")
