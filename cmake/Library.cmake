@@ -24,6 +24,8 @@ target_include_directories(vclink_git PUBLIC
 set_target_properties(vclink_git PROPERTIES
     VERSION ${PROJECT_VERSION}
     SOVERSION ${PROJECT_VERSION_MAJOR}
+    EXPORT_NAME git
+    INSTALL_RPATH "$ORIGIN"
     LINK_DEPENDS "${PROJECT_SOURCE_DIR}/cmake/exports.map"
     LIBRARY_OUTPUT_DIRECTORY "${VCLINK_STAGE_DIR}/${CMAKE_INSTALL_LIBDIR}")
 target_link_options(vclink_git PRIVATE

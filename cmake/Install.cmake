@@ -1,0 +1,18 @@
+# SPDX-License-Identifier: MIT
+# What is installed, in components that are a package each: runtime and development here, shell when
+# it is built, host-runtime and host-development of the stand-in.
+install(TARGETS vclink_git EXPORT vclink_git
+    LIBRARY DESTINATION "${CMAKE_INSTALL_LIBDIR}"
+        COMPONENT runtime NAMELINK_COMPONENT development)
+install(DIRECTORY include/
+    DESTINATION "${CMAKE_INSTALL_INCLUDEDIR}"
+    COMPONENT development
+    FILES_MATCHING PATTERN "*.hpp")
+vclink_install_package_files(vclink_git "${PROJECT_SOURCE_DIR}/cmake/package"
+    COMPONENT development)
+
+if(VCLINK_BUILD_EXAMPLES)
+    install(TARGETS vclink-shell
+        RUNTIME DESTINATION "${CMAKE_INSTALL_BINDIR}"
+        COMPONENT shell)
+endif()

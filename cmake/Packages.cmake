@@ -1,0 +1,66 @@
+# SPDX-License-Identifier: MIT
+# Debian packages, one a component: `cpack -G DEB` in a build folder.
+set(CPACK_GENERATOR DEB)
+set(CPACK_PACKAGE_NAME vclink-git)
+set(CPACK_PACKAGE_VENDOR "vclink")
+set(CPACK_PACKAGE_CONTACT "vclink developers <vclink@localhost>")
+# Each package has a summary of its own.
+set(CPACK_PACKAGE_DESCRIPTION_SUMMARY "")
+set(CPACK_PACKAGE_VERSION "${PROJECT_VERSION}")
+set(CPACK_PACKAGING_INSTALL_PREFIX /usr)
+set(CPACK_RESOURCE_FILE_LICENSE "${PROJECT_SOURCE_DIR}/LICENSE")
+
+set(CPACK_COMPONENTS_ALL runtime development)
+set(CPACK_DEB_COMPONENT_INSTALL ON)
+set(CPACK_DEBIAN_FILE_NAME DEB-DEFAULT)
+set(CPACK_DEBIAN_PACKAGE_CONTROL_STRICT_PERMISSION ON)
+set(CPACK_STRIP_FILES ON)
+
+# Dependencies on others' libraries are read from the files, those between the packages are given.
+set(CPACK_DEBIAN_PACKAGE_SHLIBDEPS ON)
+set(CPACK_DEBIAN_PACKAGE_SHLIBDEPS_PRIVATE_DIRS "${VCLINK_STAGE_DIR}/${CMAKE_INSTALL_LIBDIR}")
+set(CPACK_DEBIAN_PACKAGE_GENERATE_SHLIBS ON)
+set(CPACK_DEBIAN_PACKAGE_GENERATE_SHLIBS_POLICY ">=")
+
+# vclink_package(COMPONENT NAME SECTION SUMMARY [DEPENDS text]): a component as a package.
+macro(vclink_package component name section summary)
+    cmake_parse_arguments(package "" "DEPENDS" "" ${ARGN})
+    string(TOUPPER "${component}" upper)
+    set(CPACK_DEBIAN_${upper}_PACKAGE_NAME ${name})
+    set(CPACK_DEBIAN_${upper}_PACKAGE_SECTION ${section})
+    set(CPACK_COMPONENT_${upper}_DESCRIPTION "${summary}")
+    set(CPACK_DEBIAN_${upper}_PACKAGE_DEPENDS "${package_DEPENDS}")
+    install(FILES "${PROJECT_SOURCE_DIR}/LICENSE"
+        DESTINATION share/doc/${name}
+        RENAME copyright
+        COMPONENT ${component})
+endmacro()
+
+set(runtime libvclink-git${PROJECT_VERSION_MAJOR})
+set(host_runtime libvclink-host${PROJECT_VERSION_MAJOR})
+vclink_package(runtime ${runtime} libs
+    "Git back end of a desktop application
+ The shared library that answers the application's source-control interfaces."
+    DEPENDS "${host_runtime} (>= ${PROJECT_VERSION})")
+vclink_package(development libvclink-git-dev libdevel
+    "Git back end of a desktop application, for developers
+ Headers, and what finds the library from CMake and from pkg-config."
+    DEPENDS "${runtime} (= ${PROJECT_VERSION}), libvclink-host-dev (>= ${PROJECT_VERSION}), libboost-dev (>= 1.74)")
+if(VCLINK_BUILD_EXAMPLES)
+    list(APPEND CPACK_COMPONENTS_ALL shell)
+    vclink_package(shell vclink-shell vcs
+        "Terminal host of a Git back end
+ A program that plays the desktop application in a terminal."
+        DEPENDS "${runtime} (>= ${PROJECT_VERSION}), ${host_runtime} (>= ${PROJECT_VERSION})")
+endif()
+if(VCLINK_HOST STREQUAL "source")
+    list(APPEND CPACK_COMPONENTS_ALL host-runtime host-development)
+    vclink_package(host-runtime ${host_runtime} libs
+        "Stand-in for the SDK of a desktop application
+ Where the application's own SDK is installed, it takes the place of this library.")
+    vclink_package(host-development libvclink-host-dev libdevel
+        "Stand-in for the SDK of a desktop application, for developers
+ Headers, and what finds the stand-in from CMake and from pkg-config."
+        DEPENDS "${host_runtime} (= ${PROJECT_VERSION}), libboost-dev (>= 1.74)")
+endif()
+include(CPack)
