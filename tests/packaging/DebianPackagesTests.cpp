@@ -1,0 +1,155 @@
+// SPDX-License-Identifier: MIT
+// The Debian packages, which the fixture of these tests has made: what they say of themselves, and
+// that a host is built against what they hold.
+#include <filesystem>
+#include <map>
+#include <sstream>
+#include <string>
+#include <vector>
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include "packaging/InstalledTest.hpp"
+
+namespace
+{
+
+using namespace vclink::test;
+using testing::AllOf;
+using testing::ElementsAre;
+using testing::HasSubstr;
+using testing::Not;
+
+const std::string library = "libvclink-git" VCLINK_SO_VERSION;
+const std::string host = "libvclink-host" VCLINK_SO_VERSION;
+const std::string development = "libvclink-git-dev";
+const std::string hostDevelopment = "libvclink-host-dev";
+const std::string shell = "vclink-shell";
+
+class DebianPackages : public InstalledTest
+{
+  protected:
+    /// The packages' files by the packages' names.
+    static std::map<std::string, std::filesystem::path> packages()
+    {
+        std::map<std::string, std::filesystem::path> files;
+        for (const auto &entry : std::filesystem::directory_iterator(VCLINK_PACKAGE_FOLDER))
+        {
+            if (entry.path().extension() == ".deb")
+            {
+                const std::string name = entry.path().filename().string();
+                files.emplace(name.substr(0, name.find('_')), entry.path());
+            }
+        }
+        return files;
+    }
+
+    static std::string field(const std::string &package, const std::string &name)
+    {
+        const auto text =
+            runToSuccess(Command({"dpkg-deb", "--field", packages().at(package).string(), name}));
+        return text.substr(0, text.find_last_not_of('\n') + 1);
+    }
+
+    /// Unpacks packages into one place, as on a machine that has them.
+    std::filesystem::path unpack(const std::vector<std::string> &names) const
+    {
+        for (const auto &name : names)
+        {
+            runToSuccess(Command({"dpkg-deb", "--extract", packages().at(name).string(),
+                                  (folder() / "machine").string()}));
+        }
+        return folder() / "machine";
+    }
+};
+
+TEST_F(DebianPackages, AreOneForEachPurpose)
+{
+    std::vector<std::string> names;
+    for (const auto &package : packages())
+    {
+        names.push_back(package.first);
+    }
+    EXPECT_THAT(names, ElementsAre(development, library, hostDevelopment, host, shell));
+}
+
+TEST_F(DebianPackages, CarryTheVersionAndTheMachine)
+{
+    for (const auto &package : packages())
+    {
+        EXPECT_EQ(field(package.first, "Version"), VCLINK_VERSION) << package.first;
+        EXPECT_NE(field(package.first, "Architecture"), "all") << package.first;
+        EXPECT_NE(field(package.first, "Description"), "") << package.first;
+    }
+}
+
+TEST_F(DebianPackages, OfTheLibraryDependsOnWhatItIsLinkedWith)
+{
+    const std::string depends = field(library, "Depends");
+    for (const auto *needed : {"libgit2-", "libboost-filesystem", "libboost-thread", "libc6"})
+    {
+        EXPECT_THAT(depends, HasSubstr(needed));
+    }
+    EXPECT_THAT(depends, HasSubstr(host + " (>= " VCLINK_VERSION ")"));
+    // Of the stand-in alone.
+    EXPECT_THAT(depends, AllOf(Not(HasSubstr("locale")), Not(HasSubstr("-dev"))));
+}
+
+TEST_F(DebianPackages, OfTheStandInKnowsNothingOfTheLibrary)
+{
+    EXPECT_THAT(field(host, "Depends"), Not(HasSubstr("vclink")));
+    EXPECT_THAT(field(hostDevelopment, "Depends"),
+                AllOf(HasSubstr(host + " (= " VCLINK_VERSION ")"), HasSubstr("libboost-dev"),
+                      Not(HasSubstr("vclink-git"))));
+}
+
+TEST_F(DebianPackages, ForDevelopmentDependOnTheSameLibraries)
+{
+    EXPECT_THAT(field(development, "Depends"),
+                AllOf(HasSubstr(library + " (= " VCLINK_VERSION ")"), HasSubstr(hostDevelopment),
+                      HasSubstr("libboost-dev")));
+}
+
+TEST_F(DebianPackages, NameTheLibraryForThoseThatDependOnIt)
+{
+    for (const auto &name : {library, host})
+    {
+        const auto shared =
+            runToSuccess(Command({"dpkg-deb", "--info", packages().at(name).string(), "shlibs"}));
+        EXPECT_THAT(shared,
+                    HasSubstr(" " VCLINK_SO_VERSION " " + name + " (>= " VCLINK_VERSION ")"));
+    }
+}
+
+TEST_F(DebianPackages, HoldFilesOfRootThatOthersCantWrite)
+{
+    for (const auto &package : packages())
+    {
+        std::istringstream list(
+            runToSuccess(Command({"dpkg-deb", "--contents", package.second.string()})));
+        for (std::string line; std::getline(list, line);)
+        {
+            EXPECT_THAT(line, HasSubstr(" root/root ")) << package.first;
+            EXPECT_TRUE(line[0] == 'l' || (line[5] == '-' && line[8] == '-')) << line;
+        }
+    }
+}
+
+TEST_F(DebianPackages, ServeAHostThatIsBuiltAgainstThem)
+{
+    const auto machine = unpack({library, development, host, hostDevelopment});
+    const auto build = buildAgainst(machine / "usr", VCLINK_SOURCE_FOLDER "/examples/embed");
+    const auto repository = makeWorkingCopy();
+    const Command embed({(build / "embed").string(), repository.path().string()});
+    EXPECT_EQ(runToSuccess(embed), describeWorkingCopy(repository));
+}
+
+TEST_F(DebianPackages, OfTheShellRunsOnThoseOfTheLibraries)
+{
+    const auto machine = unpack({library, host, shell});
+    EXPECT_THAT(runToSuccess(Command({(machine / "usr/bin/vclink-shell").string(), "version"})),
+                HasSubstr(VCLINK_VERSION));
+}
+
+} // namespace

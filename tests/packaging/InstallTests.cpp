@@ -1,0 +1,154 @@
+// SPDX-License-Identifier: MIT
+// What each component installs, and that an installation knows neither where it was built nor where
+// it was installed first.
+#include <algorithm>
+#include <filesystem>
+#include <fstream>
+#include <iterator>
+#include <string>
+#include <vector>
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include "packaging/InstalledTest.hpp"
+
+namespace
+{
+
+using namespace vclink::test;
+using testing::ElementsAreArray;
+using testing::HasSubstr;
+using testing::Not;
+
+const std::string libraries = VCLINK_LIBRARY_FOLDER;
+const std::string version = VCLINK_VERSION;
+
+std::vector<std::string> sorted(std::vector<std::string> names)
+{
+    std::sort(names.begin(), names.end());
+    return names;
+}
+
+/// The headers of a folder of the sources, as they are installed.
+std::vector<std::string> headersOf(const std::string &folder, const std::string &installed)
+{
+    std::vector<std::string> names;
+    for (const auto &name : filesBelow(VCLINK_SOURCE_FOLDER "/" + folder))
+    {
+        names.push_back(installed + name);
+    }
+    return names;
+}
+
+std::vector<std::string> developmentFiles(const std::string &package)
+{
+    const std::string configuration = libraries + "/cmake/" + package + "/" + package;
+    return {libraries + "/lib" + package + ".so",
+            libraries + "/pkgconfig/" + package + ".pc",
+            configuration + "Config.cmake",
+            configuration + "ConfigVersion.cmake",
+            configuration + "Targets.cmake",
+            configuration + "Targets-" VCLINK_CONFIGURATION ".cmake"};
+}
+
+class Component : public InstalledTest
+{
+  protected:
+    std::vector<std::string> filesOf(const std::string &component) const
+    {
+        install(folder() / "prefix", {component});
+        return filesBelow(folder() / "prefix");
+    }
+};
+
+TEST_F(Component, RuntimeIsTheLibraryAlone)
+{
+    EXPECT_THAT(
+        filesOf("runtime"),
+        ElementsAreArray(sorted({libraries + "/libvclink_git.so." + version,
+                                 libraries + "/libvclink_git.so." VCLINK_SO_VERSION,
+                                 "share/doc/libvclink-git" VCLINK_SO_VERSION "/copyright"})));
+    EXPECT_EQ(std::filesystem::read_symlink(folder() / "prefix" / libraries /
+                                            "libvclink_git.so." VCLINK_SO_VERSION),
+              "libvclink_git.so." + version);
+}
+
+TEST_F(Component, DevelopmentIsTheExportedHeadersAndWhatFindsTheLibrary)
+{
+    auto expected = headersOf("include", "include/");
+    for (const auto &name : developmentFiles("vclink_git"))
+    {
+        expected.push_back(name);
+    }
+    expected.emplace_back("share/doc/libvclink-git-dev/copyright");
+    EXPECT_THAT(filesOf("development"), ElementsAreArray(sorted(expected)));
+}
+
+TEST_F(Component, HostRuntimeIsTheStandInWithItsCatalogueAndLaunchers)
+{
+    const std::string launchers = "bin/lnxhost/";
+    EXPECT_THAT(
+        filesOf("host-runtime"),
+        ElementsAreArray(sorted({launchers + "vkAutoMerge.sh", launchers + "vkDiff",
+                                 launchers + "vkMerge", libraries + "/libvclink_host.so." + version,
+                                 libraries + "/libvclink_host.so." VCLINK_SO_VERSION,
+                                 "share/doc/libvclink-host" VCLINK_SO_VERSION "/copyright",
+                                 "share/locale/de/LC_MESSAGES/vclink_git.mo",
+                                 "share/locale/ja/LC_MESSAGES/vclink_git.mo"})));
+}
+
+TEST_F(Component, HostDevelopmentIsTheHeadersOfTheStandIn)
+{
+    auto expected = headersOf("host/include", "include/vclink_host/");
+    for (const auto &name : developmentFiles("vclink_host"))
+    {
+        expected.push_back(name);
+    }
+    expected.emplace_back("share/doc/libvclink-host-dev/copyright");
+    EXPECT_THAT(filesOf("host-development"), ElementsAreArray(sorted(expected)));
+}
+
+TEST_F(Component, ShellRunsFromWhereverItIsInstalled)
+{
+    install(folder() / "first", {"runtime", "host-runtime", "shell"});
+    std::filesystem::rename(folder() / "first", folder() / "second");
+    const auto repository = makeWorkingCopy();
+    const Command status({(folder() / "second" / "bin" / "vclink-shell").string(), "-C",
+                          repository.path().string(), "status"});
+    EXPECT_THAT(runToSuccess(status), HasSubstr("modified\tmodified.txt\n"));
+}
+
+TEST_F(Component, ShellTellsFailuresInTheInstalledLanguages)
+{
+    install(folder() / "first", {"runtime", "host-runtime", "shell"});
+    std::filesystem::rename(folder() / "first", folder() / "second");
+    std::filesystem::create_directory(folder() / "broken");
+    std::ofstream(folder() / "broken" / ".git") << "no link to a repository\n";
+    const auto say = [&](const std::string &language)
+    {
+        return Command({(folder() / "second" / "bin" / "vclink-shell").string(), "--lang", language,
+                        "-C", (folder() / "broken").string(), "status"})
+            .run()
+            .errors;
+    };
+    EXPECT_THAT(say("en"), HasSubstr("Git could not complete the operation"));
+    EXPECT_THAT(say("de"), Not(HasSubstr("Git could not complete the operation")));
+    EXPECT_THAT(say("de"), HasSubstr(".git"));
+}
+
+TEST_F(Component, NoneTellsWhereItWasBuiltOrInstalled)
+{
+    const auto prefix = installAndMove();
+    install(prefix, {"shell"});
+    for (const auto &name : filesBelow(prefix))
+    {
+        std::ifstream file(prefix / name, std::ios::binary);
+        const std::string bytes{std::istreambuf_iterator<char>(file), {}};
+        EXPECT_EQ(bytes.find(VCLINK_BUILD_FOLDER), std::string::npos) << name;
+        EXPECT_EQ(bytes.find(VCLINK_SOURCE_FOLDER), std::string::npos) << name;
+        EXPECT_EQ(bytes.find((folder() / "first").string()), std::string::npos) << name;
+    }
+}
+
+} // namespace
