@@ -49,12 +49,12 @@ std::string DaemonTest::urlAt(std::uint16_t port) const
     return "git://127.0.0.1:" + std::to_string(port) + "/" + served_.path().filename().string();
 }
 
-std::string DaemonTest::commitNoise(GitRepository &repository, unsigned seed)
+std::string DaemonTest::commitNoise(GitRepository &repository, unsigned seed, std::size_t bytes)
 {
     std::mt19937 engine(seed);
     for (int i = 0; i < fileCount; ++i)
     {
-        std::string noise(size / fileCount, '\0');
+        std::string noise(bytes / fileCount, '\0');
         for (char &byte : noise)
             byte = static_cast<char>(engine() & 0xFF);
         repository.write("folder" + std::to_string(i % 7) + "/file" + std::to_string(i), noise);

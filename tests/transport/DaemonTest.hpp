@@ -25,9 +25,9 @@ class RunningDaemon
 class DaemonTest : public RunningDaemon, public RemoteTest
 {
   protected:
-    static constexpr int fileCount = 200;
+    static constexpr int fileCount = 100;
     /// What a clone transfers at least; the files hold noise, which can't be packed.
-    static constexpr std::size_t size = 3'000'000;
+    static constexpr std::size_t size = 1'000'000;
 
     DaemonTest();
     static void TearDownTestSuite();
@@ -36,7 +36,8 @@ class DaemonTest : public RunningDaemon, public RemoteTest
     std::string urlAt(std::uint16_t port) const;
     /// Writes the files with other noise into a working copy, and commits them.
     /// @return the id of the commit
-    static std::string commitNoise(GitRepository &repository, unsigned seed);
+    static std::string commitNoise(GitRepository &repository, unsigned seed,
+                                   std::size_t bytes = size);
     std::string servedId(const std::string &reference) const;
 
     GitRepository served_ = server().makeRepository();

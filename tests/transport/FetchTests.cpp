@@ -8,9 +8,9 @@
 namespace
 {
 
+using vclink::test::allTransports;
 using vclink::test::GitRepository;
 using vclink::test::referencesOf;
-using vclink::test::Transport;
 
 /// Two clones of one repository: what the library fetches into the one is what git fetches into the
 /// other.
@@ -151,6 +151,6 @@ TEST_P(Fetch, TakesAThousandCommits)
     expectSame();
 }
 
-VCLINK_OVER_ALL_TRANSPORTS(Fetch);
+INSTANTIATE_TEST_SUITE_P(Over, Fetch, allTransports(), testing::PrintToStringParamName());
 
 } // namespace

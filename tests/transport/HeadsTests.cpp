@@ -12,8 +12,8 @@ namespace
 
 using testing::IsEmpty;
 using testing::SizeIs;
+using vclink::test::allTransports;
 using vclink::test::GitRepository;
-using vclink::test::Transport;
 
 class RemoteHeads : public vclink::test::TransportTest
 {
@@ -99,6 +99,6 @@ TEST_P(RemoteHeads, AreFiveThousand)
     EXPECT_EQ(listed(), listedByGit());
 }
 
-VCLINK_OVER_ALL_TRANSPORTS(RemoteHeads);
+INSTANTIATE_TEST_SUITE_P(Over, RemoteHeads, allTransports(), testing::PrintToStringParamName());
 
 } // namespace

@@ -8,8 +8,8 @@
 namespace
 {
 
+using vclink::test::allTransports;
 using vclink::test::GitRepository;
-using vclink::test::Transport;
 
 /// What git itself makes of the servers: a failure here is not the library's.
 class Servers : public vclink::test::RunningServer, public vclink::test::GitTest
@@ -44,9 +44,6 @@ TEST_P(Servers, TakeWhatGitPushesAndGiveItBack)
     EXPECT_EQ(clone.line({"rev-parse", "refs/remotes/origin/main"}), second);
 }
 
-INSTANTIATE_TEST_SUITE_P(Transports, Servers,
-                         testing::Values(Transport::path, Transport::file, Transport::git,
-                                         Transport::ssh, Transport::http, Transport::https),
-                         [](const auto &instance) { return vclink::test::nameOf(instance.param); });
+INSTANTIATE_TEST_SUITE_P(Transports, Servers, allTransports(), testing::PrintToStringParamName());
 
 } // namespace

@@ -32,12 +32,4 @@ class TransportTest : public RunningServer, public RemoteTest
     GitRepository source_ = makeRepository("source");
 };
 
-/// Runs a suite over every transport.
-#define VCLINK_OVER_ALL_TRANSPORTS(suite)                                                          \
-    INSTANTIATE_TEST_SUITE_P(Over, suite,                                                          \
-                             testing::Values(Transport::path, Transport::file, Transport::git,     \
-                                             Transport::ssh, Transport::http, Transport::https),   \
-                             [](const auto &instance)                                              \
-                             { return vclink::test::nameOf(instance.param); })
-
 } // namespace vclink::test

@@ -83,8 +83,7 @@ TEST_P(WebPassword, InTheAddressIsTakenByLibgit2Itself)
 
 INSTANTIATE_TEST_SUITE_P(Sites, WebPassword,
                          testing::Values(Site::httpWithPassword, Site::httpsWithPassword),
-                         [](const auto &instance)
-                         { return instance.param == Site::httpWithPassword ? "Http" : "Https"; });
+                         testing::PrintToStringParamName());
 
 /// What the floor's callback is told.
 struct Told
@@ -108,6 +107,11 @@ struct SiteOfCertificate
     /// Whether libgit2 finds the certificate valid, once it trusts the authority.
     bool valid;
 };
+
+void PrintTo(const SiteOfCertificate &site, std::ostream *stream)
+{
+    *stream << site.name;
+}
 
 class Certificates : public WebTest, public testing::WithParamInterface<SiteOfCertificate>
 {

@@ -180,4 +180,12 @@ void WebServer::prepareClient() const
     ::setenv("GIT_SSL_CAINFO", authority().c_str(), 1);
 }
 
+void PrintTo(Site site, std::ostream *stream)
+{
+    static const std::array<const char *, sites.size()> names{
+        "Http",         "HttpWithPassword", "Https", "HttpsWithPassword", "HttpsSelfSigned",
+        "HttpsExpired", "HttpsWrongHost"};
+    *stream << names.at(static_cast<std::size_t>(site));
+}
+
 } // namespace vclink::test

@@ -4,6 +4,7 @@
 #include <cstdint>
 #include <filesystem>
 #include <memory>
+#include <ostream>
 #include <string>
 
 #include "CertificateAuthority.hpp"
@@ -64,5 +65,7 @@ class WebServer : public GitServer
     std::unique_ptr<ServerProcess> backend_;
     ListeningServer front_;
 };
+
+void PrintTo(WebServer::Site site, std::ostream *stream);
 
 } // namespace vclink::test

@@ -72,6 +72,12 @@ class Relay
 
 } // namespace
 
+void PrintTo(Fate fate, std::ostream *stream)
+{
+    static const std::array<const char *, 3> names{"GoesOn", "Closes", "Resets"};
+    *stream << names.at(static_cast<std::size_t>(fate));
+}
+
 std::function<void(Connection &)> relayTo(std::uint16_t port, RelayPlan plan)
 {
     return [port, plan = std::move(plan)](Connection &client) { Relay(client, port, plan).run(); };

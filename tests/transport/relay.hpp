@@ -5,6 +5,7 @@
 #include <cstddef>
 #include <cstdint>
 #include <functional>
+#include <ostream>
 
 #include "ScriptedServer.hpp"
 
@@ -18,6 +19,8 @@ enum class Fate
     closes,
     resets
 };
+
+void PrintTo(Fate fate, std::ostream *stream);
 
 /// How a connection is passed on.
 struct RelayPlan

@@ -26,6 +26,18 @@ enum class Transport
 std::string nameOf(Transport transport);
 void PrintTo(Transport transport, std::ostream *stream);
 
+/// What a suite is run over.
+inline auto allTransports()
+{
+    return testing::Values(Transport::path, Transport::file, Transport::git, Transport::ssh,
+                           Transport::http, Transport::https);
+}
+/// Those that have a server at their end.
+inline auto transportsWithServer()
+{
+    return testing::Values(Transport::git, Transport::ssh, Transport::http, Transport::https);
+}
+
 /// Base of what runs once over each transport. The transport's server runs before the test's own
 /// environment is made, because it outlives the test; it is started for the first test that wants
 /// it, and ends with the suite.
