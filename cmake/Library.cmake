@@ -8,7 +8,7 @@ target_include_directories(vclink_git_objects PUBLIC
 target_link_libraries(vclink_git_objects
     PUBLIC vclink::host Boost::headers Boost::filesystem Boost::thread PkgConfig::libgit2
     PRIVATE vclink_hardening)
-# Whole debug information, whatever the preset says: the packages of symbols and the report on the
+# Whole debug information, whatever the preset says: the packages for debuggers and the report on the
 # binary interface are made from it.
 target_compile_options(vclink_git_objects PRIVATE $<$<CONFIG:RelWithDebInfo>:-g2>)
 

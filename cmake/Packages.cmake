@@ -14,7 +14,8 @@ set(CPACK_COMPONENTS_ALL runtime development)
 set(CPACK_DEB_COMPONENT_INSTALL ON)
 set(CPACK_DEBIAN_FILE_NAME DEB-DEFAULT)
 set(CPACK_DEBIAN_PACKAGE_CONTROL_STRICT_PERMISSION ON)
-set(CPACK_STRIP_FILES ON)
+# What debuggers read is in packages of its own, of the extension ddeb.
+set(CPACK_DEBIAN_DEBUGINFO_PACKAGE ON)
 
 # Dependencies on others' libraries are read from the files, those between the packages are given.
 set(CPACK_DEBIAN_PACKAGE_SHLIBDEPS ON)

@@ -3,6 +3,7 @@
 // that a host is built against what they hold.
 #include <filesystem>
 #include <map>
+#include <regex>
 #include <sstream>
 #include <string>
 #include <vector>
@@ -31,12 +32,13 @@ class DebianPackages : public InstalledTest
 {
   protected:
     /// The packages' files by the packages' names.
-    static std::map<std::string, std::filesystem::path> packages()
+    static std::map<std::string, std::filesystem::path>
+    packages(const std::string &extension = ".deb")
     {
         std::map<std::string, std::filesystem::path> files;
         for (const auto &entry : std::filesystem::directory_iterator(VCLINK_PACKAGE_FOLDER))
         {
-            if (entry.path().extension() == ".deb")
+            if (entry.path().extension() == extension)
             {
                 const std::string name = entry.path().filename().string();
                 files.emplace(name.substr(0, name.find('_')), entry.path());
@@ -133,6 +135,30 @@ TEST_F(DebianPackages, HoldFilesOfRootThatOthersCantWrite)
             EXPECT_THAT(line, HasSubstr(" root/root ")) << package.first;
             EXPECT_TRUE(line[0] == 'l' || (line[5] == '-' && line[8] == '-')) << line;
         }
+    }
+}
+
+TEST_F(DebianPackages, LeaveWhatDebuggersReadToOthersThatMatch)
+{
+    const auto symbols = packages(".ddeb");
+    for (const auto &name : {library, host, shell})
+    {
+        runToSuccess(Command({"dpkg-deb", "--extract", symbols.at(name + "-dbgsym").string(),
+                              (folder() / "symbols").string()}));
+    }
+    const auto machine = unpack({library, host, shell});
+    for (const auto *name :
+         {"bin/vclink-shell", VCLINK_LIBRARY_FOLDER "/libvclink_git.so." VCLINK_SO_VERSION,
+          VCLINK_LIBRARY_FOLDER "/libvclink_host.so." VCLINK_SO_VERSION})
+    {
+        const auto notes = runToSuccess(Command(
+            {"readelf", "--notes", "--sections", "--wide", (machine / "usr" / name).string()}));
+        EXPECT_THAT(notes, Not(HasSubstr(" .debug_info "))) << name;
+        std::smatch id;
+        ASSERT_TRUE(std::regex_search(notes, id, std::regex("Build ID: (..)([0-9a-f]+)"))) << notes;
+        EXPECT_TRUE(std::filesystem::exists((folder() / "symbols") / "usr/lib/debug/.build-id" /
+                                            id[1].str() / (id[2].str() + ".debug")))
+            << name;
     }
 }
 
