@@ -88,14 +88,14 @@ TEST_F(Component, DevelopmentIsTheExportedHeadersAndWhatFindsTheLibrary)
 TEST_F(Component, HostRuntimeIsTheStandInWithItsCatalogueAndLaunchers)
 {
     const std::string launchers = "bin/lnxhost/";
-    EXPECT_THAT(
-        filesOf("host-runtime"),
-        ElementsAreArray(sorted({launchers + "vkAutoMerge.sh", launchers + "vkDiff",
-                                 launchers + "vkMerge", libraries + "/libvclink_host.so." + version,
-                                 libraries + "/libvclink_host.so." VCLINK_SO_VERSION,
-                                 "share/doc/libvclink-host" VCLINK_SO_VERSION "/copyright",
-                                 "share/locale/de/LC_MESSAGES/vclink_git.mo",
-                                 "share/locale/ja/LC_MESSAGES/vclink_git.mo"})));
+    const std::string library = libraries + "/libvclink_host.so.";
+    const std::string copyright = "share/doc/libvclink-host" VCLINK_SO_VERSION "/copyright";
+    EXPECT_THAT(filesOf("host-runtime"),
+                ElementsAreArray(
+                    sorted({launchers + "vkAutoMerge.sh", launchers + "vkDiff",
+                            launchers + "vkMerge", library + version, library + VCLINK_SO_VERSION,
+                            copyright, "share/locale/de/LC_MESSAGES/vclink_git.mo",
+                            "share/locale/ja/LC_MESSAGES/vclink_git.mo"})));
 }
 
 TEST_F(Component, HostDevelopmentIsTheHeadersOfTheStandIn)

@@ -55,9 +55,9 @@ std::filesystem::path InstalledTest::buildAgainst(const std::filesystem::path &p
                                                   const std::filesystem::path &project) const
 {
     const std::filesystem::path build = folder() / "build";
+    const std::string compiler = "CMAKE_CXX_COMPILER=" VCLINK_COMPILER;
     runToSuccess(Command({VCLINK_CMAKE, "-G", "Ninja", "-S", project.string(), "-B", build.string(),
-                          "-D", "CMAKE_CXX_COMPILER=" VCLINK_COMPILER, "-D",
-                          "CMAKE_PREFIX_PATH=" + prefix.string()})
+                          "-D", compiler, "-D", "CMAKE_PREFIX_PATH=" + prefix.string()})
                      .withoutEnvironment("CMAKE_C_COMPILER_LAUNCHER")
                      .withoutEnvironment("CMAKE_CXX_COMPILER_LAUNCHER"));
     runToSuccess(Command({VCLINK_CMAKE, "--build", build.string(), "--verbose"}));
