@@ -4,6 +4,14 @@
 # to the file itself, so that an installation may be moved as a whole.
 include(CMakePackageConfigHelpers)
 
+if(VCLINK_INSTALL)
+    foreach(folder IN ITEMS BINDIR INCLUDEDIR LIBDIR)
+        if(IS_ABSOLUTE "${CMAKE_INSTALL_${folder}}")
+            message(FATAL_ERROR "CMAKE_INSTALL_${folder} is to be relative to the prefix.")
+        endif()
+    endforeach()
+endif()
+
 function(vclink_install_package_files package folder)
     cmake_parse_arguments(PARSE_ARGV 2 arg "" "COMPONENT" "")
     set(cmake_folder "${CMAKE_INSTALL_LIBDIR}/cmake/${package}")
