@@ -70,7 +70,7 @@ Certificate CertificateAuthority::issue(const std::string &name, const std::stri
     makeRequest(folder_, name, name + ".csr", host, {"-addext", "subjectAltName=DNS:" + host});
     std::vector<std::string> arguments{"ca",  "-batch",      "-notext", "-config",    "ca.conf",
                                        "-in", name + ".csr", "-out",    name + ".pem"};
-    if (validity == Validity::now)
+    if (validity == Validity::Now)
         arguments.insert(arguments.end(), {"-days", "7"});
     else
         arguments.insert(arguments.end(),

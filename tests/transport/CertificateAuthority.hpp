@@ -20,8 +20,8 @@ class CertificateAuthority
   public:
     enum class Validity
     {
-        now,
-        longAgo
+        Now,
+        LongAgo
     };
 
     /// @param folder where all files go; must be there

@@ -116,7 +116,7 @@ class MisbehavingServer : public vclink::test::DaemonTest
         RelayPlan plan;
         plan.blockSize = std::min<std::size_t>(toClient, 4096);
         plan.decide = [toClient, fate](std::size_t done, std::size_t)
-        { return done < toClient ? Fate::goesOn : fate; };
+        { return done < toClient ? Fate::GoesOn : fate; };
         return relayTo(server().port(), plan);
     }
     void expectCloneFails(const std::function<void(Connection &)> &script)
@@ -142,17 +142,17 @@ class MisbehavingServer : public vclink::test::DaemonTest
 
 TEST_F(MisbehavingServer, ThatClosesInTheMiddleOfAPackIsAFailure)
 {
-    expectCloneFails(endingAfter(size / 2, Fate::closes));
+    expectCloneFails(endingAfter(size / 2, Fate::Closes));
 }
 
 TEST_F(MisbehavingServer, ThatResetsInTheMiddleOfAPackIsAFailure)
 {
-    expectCloneFails(endingAfter(size / 2, Fate::resets));
+    expectCloneFails(endingAfter(size / 2, Fate::Resets));
 }
 
 TEST_F(MisbehavingServer, ThatClosesInTheMiddleOfItsReferencesIsAFailure)
 {
-    expectCloneFails(endingAfter(20, Fate::closes));
+    expectCloneFails(endingAfter(20, Fate::Closes));
 }
 
 TEST_F(MisbehavingServer, InTheMiddleOfAFetchLeavesTheReferences)
@@ -162,7 +162,7 @@ TEST_F(MisbehavingServer, InTheMiddleOfAFetchLeavesTheReferences)
     source_.git({"push", "--quiet", served_.path(), "HEAD:refs/heads/main"});
     const std::string before = vclink::test::referencesOf(cloned);
     {
-        const ScriptedServer broken(endingAfter(size / 2, Fate::closes));
+        const ScriptedServer broken(endingAfter(size / 2, Fate::Closes));
         cloned.git({"remote", "set-url", "origin", urlAt(broken.port())});
         expectToldBy(failureOf([&] { fetch(cloned); }));
     }
@@ -245,7 +245,7 @@ TEST_P(BrokenPush, IsAFailureAndTheProcessLives)
         RelayPlan plan;
         plan.blockSize = 4096;
         plan.decide = [](std::size_t, std::size_t toServer)
-        { return toServer < size / 2 ? Fate::goesOn : GetParam(); };
+        { return toServer < size / 2 ? Fate::GoesOn : GetParam(); };
         const ScriptedServer broken(relayTo(server().port(), plan));
         cloned.git({"remote", "set-url", "origin", urlAt(broken.port())});
         expectToldBy(failureOf([&] { push(cloned, {"HEAD:refs/heads/new"}); }));
@@ -265,7 +265,7 @@ TEST_P(BrokenPush, IsAFailureAndTheProcessLives)
     EXPECT_EQ(servedId("refs/heads/new"), id);
 }
 
-INSTANTIATE_TEST_SUITE_P(Server, BrokenPush, testing::Values(Fate::closes, Fate::resets),
+INSTANTIATE_TEST_SUITE_P(Server, BrokenPush, testing::Values(Fate::Closes, Fate::Resets),
                          testing::PrintToStringParamName());
 
 } // namespace

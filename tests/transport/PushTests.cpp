@@ -207,7 +207,7 @@ TEST_P(PushWithoutServer, AsksNoHook)
     EXPECT_EQ(servedId("refs/heads/new"), second_);
 }
 
-INSTANTIATE_TEST_SUITE_P(Over, PushWithoutServer, testing::Values(Transport::path, Transport::file),
+INSTANTIATE_TEST_SUITE_P(Over, PushWithoutServer, testing::Values(Transport::Path, Transport::File),
                          testing::PrintToStringParamName());
 
 } // namespace

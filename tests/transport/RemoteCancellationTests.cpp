@@ -51,11 +51,11 @@ class RemoteCancellation : public vclink::test::DaemonTest
         {
             transferred_ = toClient;
             if (toClient < size / 10)
-                return Fate::goesOn;
+                return Fate::GoesOn;
             if (!asked_.exchange(true))
                 interactor_->cancel();
             std::this_thread::sleep_for(std::chrono::milliseconds(50));
-            return Fate::goesOn;
+            return Fate::GoesOn;
         };
         return relayTo(server().port(), plan);
     }

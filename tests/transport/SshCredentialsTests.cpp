@@ -175,7 +175,7 @@ TEST_F(SshCredentials, HaveNoUserWhereTheAddressHasNone)
 class SshPasswords : public vclink::test::RemoteTest
 {
   protected:
-    SshServer server_{SshServer::Offers::passwords};
+    SshServer server_{SshServer::Offers::Passwords};
 };
 
 TEST_F(SshPasswords, AreNotGiven)

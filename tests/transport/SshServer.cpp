@@ -54,7 +54,7 @@ SshServer::SshServer(Offers offers) : offers_(offers)
 std::string SshServer::configuration(std::uint16_t port) const
 {
     const std::string home = folder();
-    const bool keys = offers_ == Offers::keys;
+    const bool keys = offers_ == Offers::Keys;
     // The log-in shell reads nothing of the real home. The folder is below one that everybody may
     // write to, which is what StrictModes would refuse.
     return "ListenAddress 127.0.0.1:" + std::to_string(port) +

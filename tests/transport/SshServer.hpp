@@ -18,11 +18,11 @@ class SshServer : public GitServer
   public:
     enum class Offers
     {
-        keys,
-        passwords
+        Keys,
+        Passwords
     };
 
-    explicit SshServer(Offers offers = Offers::keys);
+    explicit SshServer(Offers offers = Offers::Keys);
 
     std::string base() const override;
     /// As base(), without the user's name.

@@ -30,7 +30,7 @@ class RunningWebServer
     RunningWebServer()
     {
         if (!running)
-            running = std::make_unique<WebServer>(Site::https);
+            running = std::make_unique<WebServer>(Site::Https);
     }
     static WebServer &server()
     {
@@ -82,7 +82,7 @@ TEST_P(WebPassword, InTheAddressIsTakenByLibgit2Itself)
 }
 
 INSTANTIATE_TEST_SUITE_P(Sites, WebPassword,
-                         testing::Values(Site::httpWithPassword, Site::httpsWithPassword),
+                         testing::Values(Site::HttpWithPassword, Site::HttpsWithPassword),
                          testing::PrintToStringParamName());
 
 /// What the floor's callback is told.
@@ -164,10 +164,10 @@ TEST_P(Certificates, DoWithTheLibraryWhatTheyDoWithLibgit2)
 
 INSTANTIATE_TEST_SUITE_P(
     Are, Certificates,
-    testing::Values(SiteOfCertificate{"Valid", Site::https, true},
-                    SiteOfCertificate{"SelfSigned", Site::httpsSelfSigned, false},
-                    SiteOfCertificate{"Expired", Site::httpsExpired, false},
-                    SiteOfCertificate{"OfAnotherHost", Site::httpsWrongHost, false}),
+    testing::Values(SiteOfCertificate{"Valid", Site::Https, true},
+                    SiteOfCertificate{"SelfSigned", Site::HttpsSelfSigned, false},
+                    SiteOfCertificate{"Expired", Site::HttpsExpired, false},
+                    SiteOfCertificate{"OfAnotherHost", Site::HttpsWrongHost, false}),
     [](const auto &instance) { return instance.param.name; });
 
 } // namespace

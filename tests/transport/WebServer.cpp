@@ -21,30 +21,30 @@ namespace fs = std::filesystem;
 using Site = WebServer::Site;
 using Validity = CertificateAuthority::Validity;
 
-constexpr std::array sites{Site::http,
-                           Site::httpWithPassword,
-                           Site::https,
-                           Site::httpsWithPassword,
-                           Site::httpsSelfSigned,
-                           Site::httpsExpired,
-                           Site::httpsWrongHost};
+constexpr std::array sites{Site::Http,
+                           Site::HttpWithPassword,
+                           Site::Https,
+                           Site::HttpsWithPassword,
+                           Site::HttpsSelfSigned,
+                           Site::HttpsExpired,
+                           Site::HttpsWrongHost};
 
 /// The name of a site's certificate, empty for a site without one.
 std::string certificateOf(Site site)
 {
     switch (site)
     {
-    case Site::https:
-    case Site::httpsWithPassword:
+    case Site::Https:
+    case Site::HttpsWithPassword:
         return "valid";
-    case Site::httpsSelfSigned:
+    case Site::HttpsSelfSigned:
         return "selfSigned";
-    case Site::httpsExpired:
+    case Site::HttpsExpired:
         return "expired";
-    case Site::httpsWrongHost:
+    case Site::HttpsWrongHost:
         return "wrongHost";
-    case Site::http:
-    case Site::httpWithPassword:
+    case Site::Http:
+    case Site::HttpWithPassword:
         break;
     }
     return "";
@@ -52,7 +52,7 @@ std::string certificateOf(Site site)
 
 bool wantsPassword(Site site)
 {
-    return site == Site::httpWithPassword || site == Site::httpsWithPassword;
+    return site == Site::HttpWithPassword || site == Site::HttpsWithPassword;
 }
 
 bool accepts(const fs::path &socketFile)
@@ -92,9 +92,9 @@ WebServer::WebServer(Site site)
 {
     if (!backend_->waitUntil([this] { return accepts(folder() / "backend"); }))
         throw std::runtime_error("fcgiwrap does not start:\n" + backend_->log());
-    authority_.issue("valid", "localhost", Validity::now);
-    authority_.issue("expired", "localhost", Validity::longAgo);
-    authority_.issue("wrongHost", "elsewhere.example", Validity::now);
+    authority_.issue("valid", "localhost", Validity::Now);
+    authority_.issue("expired", "localhost", Validity::LongAgo);
+    authority_.issue("wrongHost", "elsewhere.example", Validity::Now);
     authority_.selfSigned("selfSigned", "localhost");
     writeFile(folder() / "passwords", user() + ":{PLAIN}" + password() + "\n");
     front_ = startListening(sites.size(), makeFolder(folder() / "nginx"),

@@ -22,13 +22,13 @@ class WebServer : public GitServer
     /// The numbers are the places of the ports.
     enum class Site
     {
-        http,
-        httpWithPassword,
-        https,
-        httpsWithPassword,
-        httpsSelfSigned,
-        httpsExpired,
-        httpsWrongHost
+        Http,
+        HttpWithPassword,
+        Https,
+        HttpsWithPassword,
+        HttpsSelfSigned,
+        HttpsExpired,
+        HttpsWrongHost
     };
 
     /// @param site the one that base() and url() mean

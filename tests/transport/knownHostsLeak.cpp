@@ -9,8 +9,14 @@
 #include <dlfcn.h>
 
 // There are none without the leak sanitizer.
-extern "C" __attribute__((weak)) void __lsan_disable();
-extern "C" __attribute__((weak)) void __lsan_enable();
+extern "C" __attribute__((weak)) void disableLeakCheck() __asm__("__lsan_disable");
+extern "C" __attribute__((weak)) void enableLeakCheck() __asm__("__lsan_enable");
+
+extern "C" __attribute__((visibility("default"))) void *
+makeSession(void *allocate, void *release, void *reallocate,
+            void *abstract) __asm__("libssh2_session_init_ex");
+extern "C" __attribute__((visibility("default"))) void *
+makeKnownHosts(void *session) __asm__("libssh2_knownhost_init");
 
 namespace
 {
@@ -19,19 +25,19 @@ thread_local bool isDisabled = false;
 
 void disable()
 {
-    if (__lsan_disable != nullptr && !isDisabled)
+    if (disableLeakCheck != nullptr && !isDisabled)
     {
         isDisabled = true;
-        __lsan_disable();
+        disableLeakCheck();
     }
 }
 
 void enable()
 {
-    if (__lsan_enable != nullptr && isDisabled)
+    if (enableLeakCheck != nullptr && isDisabled)
     {
         isDisabled = false;
-        __lsan_enable();
+        enableLeakCheck();
     }
 }
 
@@ -45,8 +51,7 @@ template <class Function> Function *findReal(const char *name)
 
 } // namespace
 
-extern "C" __attribute__((visibility("default"))) void *
-libssh2_session_init_ex(void *allocate, void *release, void *reallocate, void *abstract)
+extern "C" void *makeSession(void *allocate, void *release, void *reallocate, void *abstract)
 {
     void *const session = findReal<void *(void *, void *, void *, void *)>(
         "libssh2_session_init_ex")(allocate, release, reallocate, abstract);
@@ -55,7 +60,7 @@ libssh2_session_init_ex(void *allocate, void *release, void *reallocate, void *a
     return session;
 }
 
-extern "C" __attribute__((visibility("default"))) void *libssh2_knownhost_init(void *session)
+extern "C" void *makeKnownHosts(void *session)
 {
     enable();
     return findReal<void *(void *)>("libssh2_knownhost_init")(session);

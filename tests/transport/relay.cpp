@@ -25,10 +25,10 @@ class Relay
 
     void run()
     {
-        Fate fate = Fate::goesOn;
-        while (fate == Fate::goesOn)
+        Fate fate = Fate::GoesOn;
+        while (fate == Fate::GoesOn)
             fate = passOn();
-        if (fate == Fate::resets)
+        if (fate == Fate::Resets)
             client_.reset();
         else
             client_.close();
@@ -43,14 +43,14 @@ class Relay
         if (::poll(waited.data(), waited.size(), -1) < 0 && errno != EINTR)
             throw std::runtime_error("poll");
         if (waited[2].revents != 0)
-            return Fate::closes;
+            return Fate::Closes;
         if (waited[1].revents != 0 && !move(server_, client_, toClient_))
-            return Fate::closes;
+            return Fate::Closes;
         if (waited[1].revents != 0)
             std::this_thread::sleep_for(plan_.pause);
         if (waited[0].revents != 0 && !move(client_, server_, toServer_))
-            return Fate::closes;
-        return plan_.decide ? plan_.decide(toClient_, toServer_) : Fate::goesOn;
+            return Fate::Closes;
+        return plan_.decide ? plan_.decide(toClient_, toServer_) : Fate::GoesOn;
     }
 
     /// Moves a block.

@@ -15,9 +15,9 @@ namespace vclink::test
 /// What becomes of a connection.
 enum class Fate
 {
-    goesOn,
-    closes,
-    resets
+    GoesOn,
+    Closes,
+    Resets
 };
 
 void PrintTo(Fate fate, std::ostream *stream);

@@ -18,18 +18,18 @@ std::unique_ptr<GitServer> start(Transport transport)
 {
     switch (transport)
     {
-    case Transport::path:
+    case Transport::Path:
         return std::make_unique<PathServer>();
-    case Transport::file:
+    case Transport::File:
         return std::make_unique<FileServer>();
-    case Transport::git:
+    case Transport::Git:
         return std::make_unique<GitDaemon>();
-    case Transport::ssh:
+    case Transport::Ssh:
         return std::make_unique<SshServer>();
-    case Transport::http:
-        return std::make_unique<WebServer>(WebServer::Site::http);
-    case Transport::https:
-        return std::make_unique<WebServer>(WebServer::Site::https);
+    case Transport::Http:
+        return std::make_unique<WebServer>(WebServer::Site::Http);
+    case Transport::Https:
+        return std::make_unique<WebServer>(WebServer::Site::Https);
     }
     return nullptr;
 }

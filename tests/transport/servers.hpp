@@ -15,12 +15,12 @@ namespace vclink::test
 /// The ways to a repository.
 enum class Transport
 {
-    path,
-    file,
-    git,
-    ssh,
-    http,
-    https
+    Path,
+    File,
+    Git,
+    Ssh,
+    Http,
+    Https
 };
 
 std::string nameOf(Transport transport);
@@ -29,13 +29,13 @@ void PrintTo(Transport transport, std::ostream *stream);
 /// What a suite is run over.
 inline auto allTransports()
 {
-    return testing::Values(Transport::path, Transport::file, Transport::git, Transport::ssh,
-                           Transport::http, Transport::https);
+    return testing::Values(Transport::Path, Transport::File, Transport::Git, Transport::Ssh,
+                           Transport::Http, Transport::Https);
 }
 /// Those that have a server at their end.
 inline auto transportsWithServer()
 {
-    return testing::Values(Transport::git, Transport::ssh, Transport::http, Transport::https);
+    return testing::Values(Transport::Git, Transport::Ssh, Transport::Http, Transport::Https);
 }
 
 /// Base of what runs once over each transport. The transport's server runs before the test's own
