@@ -6,6 +6,7 @@
 #include <string>
 
 #include <fcntl.h>
+#include <git2/errors.h>
 #include <git2/index.h>
 #include <git2/repository.h>
 #include <sys/stat.h>
@@ -22,7 +23,13 @@ namespace
 bool isIndexed(git_index *index, const char *path)
 {
     std::size_t position = 0;
-    return makeResult(git_index_find(&position, index, path)).has_value();
+    const GitResult<void> found = makeResult(git_index_find(&position, index, path));
+    if (found.has_error() && found.error().getCode() == GIT_ENOTFOUND)
+    {
+        return false;
+    }
+    found.value();
+    return true;
 }
 
 /// Why a folder above the file can't be listed, so that the refresh misses what stands in it; 0
@@ -40,14 +47,32 @@ int findHidingFolder(const std::string &workdir, const std::string &path)
     return 0;
 }
 
-/// Why the file can't be looked at; 0 when it can, and also when it is gone.
+bool isBehindLink(const std::string &workdir, const std::string &path)
+{
+    for (auto end = path.find('/'); end != std::string::npos; end = path.find('/', end + 1))
+    {
+        struct stat status = {};
+        if (lstat((workdir + path.substr(0, end)).c_str(), &status) == 0 && S_ISLNK(status.st_mode))
+        {
+            return true;
+        }
+    }
+    return false;
+}
+
+/// Why the file can't be looked at, or could not a moment ago; 0 when it can, and also when it is
+/// gone.
 int findObstacle(const std::string &workdir, const std::string &path)
 {
     struct stat status = {};
     if (lstat((workdir + path).c_str(), &status) == 0)
     {
-        // Something else took its place, a folder perhaps, unless it only can't be seen.
-        return findHidingFolder(workdir, path);
+        const int error = findHidingFolder(workdir, path);
+        // Something else took its place, a folder perhaps, unless it only can't be seen. A file is
+        // no such thing: the refresh would have taken it as it stands.
+        const bool isMissed =
+            (S_ISREG(status.st_mode) || S_ISLNK(status.st_mode)) && !isBehindLink(workdir, path);
+        return error == 0 && isMissed ? EIO : error;
     }
     return errno == ENOENT || errno == ENOTDIR ? 0 : errno;
 }

@@ -1,12 +1,41 @@
 // SPDX-License-Identifier: MIT
 #include "util/repository.hpp"
 
-#include <git2.h>
+#include <cerrno>
+#include <string>
 
+#include <git2.h>
+#include <sys/stat.h>
+
+#include "error/errorUtil/raiseSystemError.hpp"
 #include "fl/i18n/convert.hpp"
 
 namespace vclink::git
 {
+namespace
+{
+
+/// libgit2 takes an index file that it can't look at for one that is not there. Whoever then writes
+/// the index, or commits it, takes every file out of it.
+void readAgainIfEmpty(git_index *index)
+{
+    const char *const path = git_index_path(index);
+    if (git_index_entrycount(index) != 0 || path == nullptr)
+    {
+        return;
+    }
+    struct stat status = {};
+    if (::stat(path, &status) == 0)
+    {
+        makeResult(git_index_read(index, 1)).value();
+    }
+    else if (errno != ENOENT)
+    {
+        raiseSystemError(errno, std::string("could not read the index '") + path + "'");
+    }
+}
+
+} // namespace
 
 bool isRepository(const upath &path)
 {
@@ -31,7 +60,9 @@ OwnedHandle<git_repository> openRepository(const upath &root)
 
 OwnedHandle<git_index> getRepositoryIndex(git_repository *repository)
 {
-    return acquire<git_index>(git_repository_index, repository).value();
+    OwnedHandle<git_index> index = acquire<git_index>(git_repository_index, repository).value();
+    readAgainIfEmpty(index.get());
+    return index;
 }
 
 void writeIndex(git_index *index)

@@ -22,7 +22,7 @@ bool isRepository(const upath &path);
 /// Opens the repository of exactly this folder. git_repository_open_ext. Raises.
 OwnedHandle<git_repository> openRepository(const upath &root);
 
-/// git_repository_index. Raises.
+/// git_repository_index, and for an empty index git_index_read, to be sure. Raises.
 OwnedHandle<git_index> getRepositoryIndex(git_repository *repository);
 
 /// git_index_write. Raises; the index on disk is as it was then.

@@ -132,6 +132,7 @@ std::vector<Operation> adapterOperations()
         {"commitFirst", makeEmpty, commit},
         {"commitAnonymous", makeAnonymous, commit},
         {"commitSparse", makeSparse, commit},
+        {"commitNothing", makeUnindexed, commit},
         {"commitUnreadable", makeUnreadable, commit},
         {"commitMerge", makeMerging, commit},
     };

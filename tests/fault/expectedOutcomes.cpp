@@ -80,6 +80,12 @@ const std::vector<Unexamined> &allUnexamined()
     return functions;
 }
 
+std::string missed(const std::string &file)
+{
+    return failure(GIT_ERROR, GIT_ERROR_OS,
+                   "could not read '" + file + "', which is tracked: Input/output error");
+}
+
 std::vector<Tolerance> tolerancesOf(const std::string &operation, const std::string &normal)
 {
     const std::string otherTip = failureIn(operation, GIT_EMODIFIED, GIT_ERROR_OBJECT,
@@ -103,8 +109,16 @@ std::vector<Tolerance> tolerancesOf(const std::string &operation, const std::str
         {"commit", "git_repository_state", any, any, normal},
         // The identity comes from the environment then.
         {"", "git_signature_default", any, GIT_ENOTFOUND, normal},
-        // A file that can't be found in the index is looked at in the working tree.
-        {"commit", "git_index_find", any, any, normal},
+        // A file that is there, and not in the refreshed index, was missed.
+        {"commitSparse", "git_index_find", 2, GIT_ENOTFOUND, missed("other")},
+        {"commitSparse", "git_index_find", any, GIT_ENOTFOUND, normal},
+        {"commitUnreadable", "git_index_find", 1, GIT_ENOTFOUND, missed("file")},
+        {"commitUnreadable", "git_index_find", 2, GIT_ENOTFOUND, missed("other")},
+        {"commitUnreadable", "git_index_find", any, GIT_ENOTFOUND, normal},
+        {"commit", "git_index_find", 1, GIT_ENOTFOUND, missed("file")},
+        {"commit", "git_index_find", 3, GIT_ENOTFOUND, missed("staged")},
+        {"commit", "git_index_find", 4, GIT_ENOTFOUND, missed("sub/inside")},
+        {"commit", "git_index_find", any, GIT_ENOTFOUND, normal},
         // The text of the failure is the injected one then.
         {"commit", "git_error_set_str", any, any, failure(GIT_ERROR, GIT_ERROR_OS, injectedText)},
         // Without a HEAD the files are taken out of the index.

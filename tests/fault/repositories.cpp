@@ -63,6 +63,12 @@ void makeChanged(GitRepository &repository)
     change(repository);
 }
 
+void makeUnindexed(GitRepository &repository)
+{
+    makePlain(repository);
+    repository.git({"rm", "--quiet", "--cached", "-r", "."});
+}
+
 void makeAnonymous(GitRepository &repository)
 {
     makeChanged(repository);

@@ -16,6 +16,8 @@ void makeEmpty(GitRepository &repository);
 /// Plain, and a file of every state: "file" modified, "other" missing, "staged" added, "new"
 /// unversioned.
 void makeChanged(GitRepository &repository);
+/// Plain, and nothing left in the index.
+void makeUnindexed(GitRepository &repository);
 /// Changed, without an identity in the configuration.
 void makeAnonymous(GitRepository &repository);
 /// Plain, and "file" gone from the working tree, "sub/inside" left out of it by a sparse checkout.
