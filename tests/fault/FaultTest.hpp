@@ -18,7 +18,7 @@ class FaultTest : public GitTest, public testing::WithParamInterface<Operation>
 {
   protected:
     LibGit2Session session_{environment()};
-    const Trial trial_{GetParam(), folder() / "trial", environment()};
+    Trial trial_{GetParam(), folder() / "trial", environment()};
 };
 
 /// Names the tests after their operations.

@@ -43,7 +43,7 @@ class FailingLibGit2Call : public vclink::test::FaultTest
 {
   protected:
     /// The sites of the calls that give a code, each once, without a fault.
-    std::vector<FaultSite> findSites() const
+    std::vector<FaultSite> findSites()
     {
         const auto action = trial_.begin();
         const LibGit2Faults noting;
@@ -58,7 +58,7 @@ class FailingLibGit2Call : public vclink::test::FaultTest
         return sites;
     }
 
-    void fail(const FaultSite &site) const
+    void fail(const FaultSite &site)
     {
         SCOPED_TRACE(nameOf(site));
         const auto action = trial_.begin();
@@ -115,7 +115,7 @@ TEST_F(LibGit2Functions, AreAllCalledByTheOperations)
     std::set<std::string> called;
     for (const auto &operation : vclink::test::allOperations())
     {
-        const vclink::test::Trial trial(operation, folder() / operation.name, environment());
+        vclink::test::Trial trial(operation, folder() / operation.name, environment());
         const auto action = trial.begin();
         const LibGit2Faults noting;
         outcomeOf(action);

@@ -65,14 +65,15 @@ Trial::Trial(const Operation &operation, fs::path folder, const HermeticEnvironm
     normalGist_ = gist();
 }
 
-Action Trial::begin() const
+Action Trial::begin()
 {
+    adapter_.reset();
     copyTree(folder_ / "saved", folder_ / "subject");
     GitRepository(home_).write(".gitconfig", "[core]\n\tpreloadIndex = false\n");
     const auto interactor = std::make_shared<TestInteractor>();
-    const auto adapter = std::make_shared<git::GitAdapter>(
+    adapter_ = std::make_shared<git::GitAdapter>(
         asPath(repository_.path()), std::static_pointer_cast<ApplicationInteractor>(interactor));
-    return operation_.make({repository_, interactor, adapter});
+    return operation_.make({repository_, interactor, adapter_});
 }
 
 std::string Trial::gist() const
@@ -98,7 +99,14 @@ void Trial::expectSound() const
         EXPECT_TRUE(checked.succeeded()) << checked.output << checked.errors;
     }
     for (const auto &entry : fs::recursive_directory_iterator(folder_ / "subject"))
-        EXPECT_NE(entry.path().extension(), ".lock") << entry.path();
+    {
+        // libgit2 keeps this one where a fetch fails in the midst of writing; git has no use for
+        // it.
+        if (entry.path().filename() != "FETCH_HEAD.lock")
+        {
+            EXPECT_NE(entry.path().extension(), ".lock") << entry.path();
+        }
+    }
 }
 
 void Trial::expectWorksAgain(const Action &action) const

@@ -26,7 +26,12 @@ class Trial
 
     /// Puts the working copy and the user's configuration back to where they began.
     /// @return the operation on them, to be called
-    Action begin() const;
+    Action begin();
+    /// What the operation runs on. The end of another adapter would take the merge driver from it.
+    git::GitAdapter &adapter() const noexcept
+    {
+        return *adapter_;
+    }
     const GitRepository &repository() const noexcept
     {
         return repository_;
@@ -56,6 +61,7 @@ class Trial
     std::filesystem::path folder_;
     std::filesystem::path home_;
     GitRepository repository_;
+    std::shared_ptr<git::GitAdapter> adapter_;
     std::string normalOutcome_;
     std::string normalGist_;
 };

@@ -1,0 +1,176 @@
+// SPDX-License-Identifier: MIT
+#include "FailingFiles.hpp"
+
+#include <cerrno>
+#include <cstdarg>
+
+#include <dlfcn.h>
+#include <fcntl.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+namespace
+{
+
+/// Plain variables: the functions below run before and after everything else.
+bool isCounting = false;
+int callsMade = 0;
+int failingCall = 0;
+int failingError = 0;
+const char *failedFunction = nullptr;
+
+bool fails(const char *function) noexcept
+{
+    if (!isCounting || ++callsMade != failingCall)
+        return false;
+    failedFunction = function;
+    errno = failingError;
+    return true;
+}
+
+/// The C library's own function, or a sanitizer's in its place.
+template <class Function> Function *findReal(const char *name) noexcept
+{
+    return reinterpret_cast<Function *>(::dlsym(RTLD_NEXT, name));
+}
+
+mode_t readMode(int flags, va_list arguments)
+{
+    const bool hasMode = (flags & O_CREAT) != 0 || (flags & O_TMPFILE) == O_TMPFILE;
+    return hasMode ? va_arg(arguments, mode_t) : 0;
+}
+
+} // namespace
+
+namespace vclink::test
+{
+
+FailingFiles::FailingFiles() : FailingFiles(0, 0)
+{
+}
+
+FailingFiles::FailingFiles(int call, int error)
+{
+    callsMade = 0;
+    failingCall = call;
+    failingError = error;
+    failedFunction = nullptr;
+    isCounting = true;
+}
+
+FailingFiles::~FailingFiles()
+{
+    isCounting = false;
+}
+
+int FailingFiles::calls() const noexcept
+{
+    return callsMade;
+}
+
+std::string FailingFiles::failed() const
+{
+    return failedFunction != nullptr ? failedFunction : "";
+}
+
+} // namespace vclink::test
+
+extern "C"
+{
+#pragma GCC visibility push(default)
+
+    int open(const char *path, int flags, ...)
+    {
+        va_list arguments;
+        va_start(arguments, flags);
+        const mode_t mode = readMode(flags, arguments);
+        va_end(arguments);
+        static auto *const real = findReal<int(const char *, int, ...)>("open");
+        return fails("open") ? -1 : real(path, flags, mode);
+    }
+
+    int openat(int folder, const char *path, int flags, ...)
+    {
+        va_list arguments;
+        va_start(arguments, flags);
+        const mode_t mode = readMode(flags, arguments);
+        va_end(arguments);
+        static auto *const real = findReal<int(int, const char *, int, ...)>("openat");
+        return fails("openat") ? -1 : real(folder, path, flags, mode);
+    }
+
+    int creat(const char *path, mode_t mode)
+    {
+        static auto *const real = findReal<int(const char *, mode_t)>("creat");
+        return fails("creat") ? -1 : real(path, mode);
+    }
+
+    ssize_t read(int descriptor, void *data, size_t size)
+    {
+        static auto *const real = findReal<ssize_t(int, void *, size_t)>("read");
+        return fails("read") ? -1 : real(descriptor, data, size);
+    }
+
+    ssize_t write(int descriptor, const void *data, size_t size)
+    {
+        static auto *const real = findReal<ssize_t(int, const void *, size_t)>("write");
+        return fails("write") ? -1 : real(descriptor, data, size);
+    }
+
+    ssize_t pread(int descriptor, void *data, size_t size, off_t offset)
+    {
+        static auto *const real = findReal<ssize_t(int, void *, size_t, off_t)>("pread");
+        return fails("pread") ? -1 : real(descriptor, data, size, offset);
+    }
+
+    ssize_t pwrite(int descriptor, const void *data, size_t size, off_t offset)
+    {
+        static auto *const real = findReal<ssize_t(int, const void *, size_t, off_t)>("pwrite");
+        return fails("pwrite") ? -1 : real(descriptor, data, size, offset);
+    }
+
+    int rename(const char *from, const char *to) noexcept
+    {
+        static auto *const real = findReal<int(const char *, const char *)>("rename");
+        return fails("rename") ? -1 : real(from, to);
+    }
+
+    int link(const char *from, const char *to) noexcept
+    {
+        static auto *const real = findReal<int(const char *, const char *)>("link");
+        return fails("link") ? -1 : real(from, to);
+    }
+
+    int mkdir(const char *path, mode_t mode) noexcept
+    {
+        static auto *const real = findReal<int(const char *, mode_t)>("mkdir");
+        return fails("mkdir") ? -1 : real(path, mode);
+    }
+
+    int close(int descriptor)
+    {
+        static auto *const real = findReal<int(int)>("close");
+        const int result = real(descriptor);
+        return fails("close") ? -1 : result;
+    }
+
+    int stat(const char *path, struct stat *status) noexcept
+    {
+        static auto *const real = findReal<int(const char *, struct stat *)>("stat");
+        return fails("stat") ? -1 : real(path, status);
+    }
+
+    int lstat(const char *path, struct stat *status) noexcept
+    {
+        static auto *const real = findReal<int(const char *, struct stat *)>("lstat");
+        return fails("lstat") ? -1 : real(path, status);
+    }
+
+    int fstat(int descriptor, struct stat *status) noexcept
+    {
+        static auto *const real = findReal<int(int, struct stat *)>("fstat");
+        return fails("fstat") ? -1 : real(descriptor, status);
+    }
+
+#pragma GCC visibility pop
+}

@@ -1,0 +1,196 @@
+// SPDX-License-Identifier: MIT
+#include <algorithm>
+#include <array>
+#include <cerrno>
+#include <cstring>
+#include <iostream>
+#include <iterator>
+#include <map>
+#include <random>
+#include <string>
+#include <vector>
+
+#include <gtest/gtest.h>
+
+#include "../differential/expectedStates.hpp"
+#include "../differential/moves.hpp"
+#include "../util/NothingLeft.hpp"
+#include "FailingFiles.hpp"
+#include "FaultTest.hpp"
+#include "LibGit2Faults.hpp"
+#include "error/errorUtil/callbackException.hpp"
+#include "support/text.hpp"
+
+namespace
+{
+
+using vclink::test::FailingFiles;
+using vclink::test::GitRepository;
+using vclink::test::Operation;
+using vclink::test::outcomeOf;
+
+constexpr std::array<int, 4> errors{EIO, ENOSPC, EACCES, EMFILE};
+/// Of the calls that an operation makes, how many fail with each of these in a test run.
+constexpr std::size_t share = 6;
+constexpr unsigned seed = 20260;
+
+std::vector<Operation> writingOperations()
+{
+    std::vector<Operation> operations;
+    const auto &all = vclink::test::allOperations();
+    std::copy_if(all.begin(), all.end(), std::back_inserter(operations),
+                 [](const Operation &operation) { return operation.writes; });
+    return operations;
+}
+
+/// Which calls are to fail: all, or a share that differs from error to error.
+std::vector<int> chooseCalls(int count, int error)
+{
+    std::vector<int> calls;
+    for (int call = 1; call <= count; ++call)
+        calls.push_back(call);
+    if (vclink::test::wantsAllFaults())
+        return calls;
+    std::vector<int> chosen;
+    std::sample(calls.begin(), calls.end(), std::back_inserter(chosen), share,
+                std::minstd_rand(seed + static_cast<unsigned>(error)));
+    return chosen;
+}
+
+/// Expects the library to see the working copy as git does; a repository in it is git's affair.
+void expectStatesOfGit(const vclink::test::Trial &trial)
+{
+    const GitRepository &repository = trial.repository();
+    const auto report = readGitReport(repository, vclink::test::runGitStatus(repository));
+    const auto blobs = readBlobs(repository, moveCandidates(report));
+    vclink::git::GitAdapter &adapter = trial.adapter();
+    const auto isFile = [](const std::string &path) { return path.back() != '/'; };
+    vclink::test::States states;
+    const std::size_t root = repository.path().string().size() + 1;
+    for (const auto &[path, state] : adapter.getFolderStates(adapter.getRootFolder()))
+    {
+        const std::string name = vclink::test::asBytes(path).substr(root);
+        if (isFile(name))
+            states.emplace(name, state.getState());
+    }
+    EXPECT_EQ(states, expectedStates(report, blobs, isFile));
+}
+
+/// Whether an operation that fails may do something else and not tell.
+bool mayDoOtherwise(const std::string &operation)
+{
+    const std::array<std::string, 5> operations{
+        // A status walk ends where it fails, and the files behind are not known then.
+        "addFiles", "removeFiles", "revert",
+        // Without an analysis the branches are merged in full; a name that can't be looked up
+        // changes the message.
+        "merge",
+        // libgit2 keeps to itself that it could not move the remote-tracking branch.
+        "push"};
+    return std::any_of(operations.begin(), operations.end(),
+                       [&operation](const std::string &name)
+                       { return operation.compare(0, name.size(), name) == 0; });
+}
+
+class FailingFileCall : public vclink::test::FaultTest
+{
+  protected:
+    int countCalls()
+    {
+        const auto action = trial_.begin();
+        const FailingFiles counting;
+        outcomeOf(action);
+        return counting.calls();
+    }
+
+    void fail(int call, int error)
+    {
+        const auto action = trial_.begin();
+        std::string outcome;
+        std::string function;
+        {
+            const vclink::test::NothingLeft nothingLeft(environment().temporary());
+            const vclink::test::LibGit2Faults noting;
+            const FailingFiles failing(call, error);
+            outcome = outcomeOf(action);
+            function = failing.failed();
+            EXPECT_EQ(noting.openHandles(), std::vector<std::string>());
+        }
+        SCOPED_TRACE("call " + std::to_string(call) + ", " + function + ": " +
+                     std::strerror(error) + ": " + outcome);
+        const bool isNormal = outcome == trial_.normalOutcome();
+        const bool isTolerant = mayDoOtherwise(GetParam().name);
+        ++ends_[isNormal ? "as if nothing had failed" : "with an exception"];
+        if (isNormal && !isTolerant)
+        {
+            EXPECT_EQ(trial_.gist(), trial_.normalGist());
+        }
+        trial_.expectSound();
+        // git says of a sparse checkout, and of a folder that it can't enter, what it likes.
+        if (GetParam().name != "commitSparse" && GetParam().name != "commitUnreadable")
+            expectStatesOfGit(trial_);
+        trial_.expectWorksAgain(action);
+    }
+
+    std::map<std::string, int> ends_;
+};
+
+TEST_P(FailingFileCall, LeavesTheRepositoryInOrder)
+{
+    const int count = countCalls();
+    for (const int error : errors)
+    {
+        for (const int call : chooseCalls(count, error))
+            fail(call, error);
+    }
+    std::cout << "calls of the file system: " << count;
+    for (const auto &[end, runs] : ends_)
+        std::cout << "; " << runs << " runs ended " << end;
+    std::cout << '\n';
+}
+
+/// Files in what a commit takes over from the index and the working tree.
+class CommitOverFailingCall : public FailingFileCall
+{
+};
+
+/// libgit2 takes what it can't look at for what is not there.
+TEST_P(CommitOverFailingCall, FailsOrHoldsEveryFile)
+{
+    const std::vector<std::string> list{"ls-tree", "-r", "HEAD"};
+    const std::string expected = trial_.repository().git(list);
+    const int count = countCalls();
+    for (int call = 1; call <= count; ++call)
+    {
+        const auto action = trial_.begin();
+        const std::string before = trial_.repository().git(list);
+        std::string function;
+        {
+            const FailingFiles failing(call, EIO);
+            outcomeOf(action);
+            function = failing.failed();
+        }
+        const std::string after = trial_.repository().git(list);
+        EXPECT_TRUE(after == expected || after == before)
+            << "call " << call << ", " << function << ":\n"
+            << after;
+    }
+}
+
+std::vector<Operation> ordinaryCommit()
+{
+    std::vector<Operation> operations = writingOperations();
+    const auto others =
+        std::remove_if(operations.begin(), operations.end(),
+                       [](const Operation &operation) { return operation.name != "commit"; });
+    operations.erase(others, operations.end());
+    return operations;
+}
+
+INSTANTIATE_TEST_SUITE_P(Of, CommitOverFailingCall, testing::ValuesIn(ordinaryCommit()),
+                         vclink::test::nameOfTest);
+
+INSTANTIATE_TEST_SUITE_P(Of, FailingFileCall, testing::ValuesIn(writingOperations()),
+                         vclink::test::nameOfTest);
+
+} // namespace
