@@ -15,6 +15,7 @@
 
 #include "ProgressLine.hpp"
 #include "fl/i18n/convert.hpp"
+#include "libraryRecords.hpp"
 #include "names.hpp"
 #include "severities.hpp"
 #include "vclink_host/logging.hpp"
@@ -36,13 +37,14 @@ void formatRecord(const boost::log::record_view &record, boost::log::formatting_
     stream << '[' << severityName(severity) << "] " << text;
 }
 
-boost::shared_ptr<Sink> makeSink(ProgressLine &progressLine)
+boost::shared_ptr<Sink> makeSink(unsigned severities, ProgressLine &progressLine)
 {
     const auto backend = boost::make_shared<boost::log::sinks::text_ostream_backend>();
     backend->add_stream(boost::shared_ptr<std::ostream>(&std::cerr, boost::null_deleter()));
     backend->auto_flush(true);
     auto sink = boost::make_shared<Sink>(backend);
-    sink->set_filter(boost::log::expressions::attr<std::string>("Channel") == libraryLogger);
+    sink->set_filter([severities](const boost::log::attribute_value_set &values)
+                     { return isFromLibrary(values, severities); });
     sink->set_formatter(
         [&progressLine](const boost::log::record_view &record,
                         boost::log::formatting_ostream &stream)
@@ -61,7 +63,7 @@ struct LogOutput::Impl
 };
 
 LogOutput::LogOutput(unsigned severities, ProgressLine &progressLine)
-    : impl_(std::make_unique<Impl>(Impl{makeSink(progressLine)}))
+    : impl_(std::make_unique<Impl>(Impl{makeSink(severities, progressLine)}))
 {
     boost::log::core::get()->add_sink(impl_->sink);
     vclink_host::setEnabledSeverities(libraryLogger, severities);

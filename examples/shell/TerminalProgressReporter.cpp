@@ -25,7 +25,8 @@ void TerminalProgressReporter::setProgressMessage(const ustring &message)
 {
     activity_.note();
     const auto now = std::chrono::steady_clock::now();
-    if (line_.isShown() && now >= nextDrawing_)
+    const bool isLast = fraction_ >= 1;
+    if (line_.isShown() && (isLast || now >= nextDrawing_))
     {
         nextDrawing_ = now + drawingPause;
         line_.draw(fraction_, message);

@@ -11,7 +11,7 @@
 namespace vclink::shell
 {
 
-/// Draws progress on a line, at most twenty times a second.
+/// Draws progress on a line, at most twenty times a second, and its end in any case.
 class TerminalProgressReporter : public ProgressReporter
 {
   public:

@@ -24,6 +24,10 @@ std::unique_ptr<Command> makeStateCommand();
 std::unique_ptr<Command> makeMergeCommand();
 std::unique_ptr<Command> makeAttributesCommand();
 std::unique_ptr<Command> makeConfigCommand();
+std::unique_ptr<Command> makeCloneCommand();
+std::unique_ptr<Command> makeFetchCommand();
+std::unique_ptr<Command> makePushCommand();
+std::unique_ptr<Command> makeHeadsCommand();
 std::unique_ptr<Command> makeProbeCommand();
 std::unique_ptr<Command> makeVersionCommand();
 

@@ -17,9 +17,14 @@ struct Severity
 };
 
 // The numbers are part of what the library promises a host.
-constexpr Severity severities[] = {
-    {"parameter", 0x02},   {"progress", 0x04},   {"diagnostic", 0x08},   {"exception", 0x10},
-    {"scope-entry", 0x20}, {"scope-exit", 0x40}, {"stack-trace", 0x200}, {"all", 0x27E}};
+constexpr Severity severities[] = {{"parameter", parameterSeverity},
+                                   {"progress", 0x04},
+                                   {"diagnostic", 0x08},
+                                   {"exception", 0x10},
+                                   {"scope-entry", 0x20},
+                                   {"scope-exit", 0x40},
+                                   {"stack-trace", 0x200},
+                                   {"all", 0x27E}};
 
 std::optional<unsigned> parseNumber(std::string_view text)
 {

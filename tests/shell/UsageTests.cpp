@@ -78,6 +78,19 @@ TEST_F(ShellUsage, EndsWithTwoAndAReasonWhenTheArgumentsMakeNoSense)
         {{"attr", "a"}, "NAME is required."},
         {{"attr", "a", "b", ""}, "NAME: it may not be empty."},
         {{"config", "a"}, "\"a\" was not expected."},
+        {{"clone"}, "SPECIFIER is required."},
+        {{"clone", "a"}, "FOLDER is required."},
+        {{"clone", "", "b"}, "SPECIFIER: it may not be empty."},
+        {{"clone", "a", ""}, "FOLDER: it may not be empty."},
+        {{"clone", "a", "b", "c"}, "\"c\" was not expected."},
+        {{"fetch"}, "REMOTE is required."},
+        {{"fetch", ""}, "REMOTE: it may not be empty."},
+        {{"fetch", "origin", ""}, "REFSPEC: it may not be empty."},
+        {{"push"}, "REMOTE is required."},
+        {{"push", "origin", "a", ""}, "REFSPEC: it may not be empty."},
+        {{"heads"}, "REMOTE is required."},
+        {{"heads", "origin", "main"}, "\"main\" was not expected."},
+        {{"heads", "-z"}, "REMOTE is required."},
     };
     for (const auto &[arguments, reason] : cases)
     {
@@ -109,6 +122,10 @@ TEST_F(ShellUsage, ExplainsItselfOnStandardOutput)
                                        "rev",
                                        "state",
                                        "merge",
+                                       "clone",
+                                       "fetch",
+                                       "push",
+                                       "heads",
                                        "attr",
                                        "config",
                                        "probe",
@@ -125,8 +142,9 @@ TEST_F(ShellUsage, ExplainsItselfOnStandardOutput)
 TEST_F(ShellUsage, ExplainsEveryCommandOnStandardOutput)
 {
     for (const std::string command :
-         {"status", "add", "rm", "resolved", "commit", "revert", "branches", "branch", "switch",
-          "current", "rev", "state", "merge", "attr", "config", "probe", "version"})
+         {"status", "add",    "rm",      "resolved", "commit", "revert", "branches",
+          "branch", "switch", "current", "rev",      "state",  "merge",  "clone",
+          "fetch",  "push",   "heads",   "attr",     "config", "probe",  "version"})
     {
         const CommandResult result = shell({command, "--help"}).run();
         EXPECT_EQ(result.exitStatus, 0);

@@ -1,0 +1,98 @@
+// SPDX-License-Identifier: MIT
+#include <string>
+#include <vector>
+
+#include <CLI/CLI.hpp>
+
+#include "Output.hpp"
+#include "Session.hpp"
+#include "commands.hpp"
+#include "fl/i18n/convert.hpp"
+#include "names.hpp"
+#include "remotes.hpp"
+#include "runWithRemote.hpp"
+
+namespace vclink::shell
+{
+namespace
+{
+
+std::string hexadecimal(const git::GitRemoteHead::Id &id)
+{
+    constexpr const char *digits = "0123456789abcdef";
+    std::string text;
+    for (const unsigned char byte : id)
+    {
+        text += digits[byte >> 4U];
+        text += digits[byte & 0xFU];
+    }
+    return text;
+}
+
+class HeadsCommand : public Command
+{
+  public:
+    void declare(CLI::App &line) override
+    {
+        remote_ = declareRemote(line);
+        line.add_flag("-z", endWithNul_, "End each line with NUL, and write names byte for byte");
+        line.footer(
+            "One line for each reference that the remote shows: the id, a tab, and the full name; "
+            "for a\nsymbolic one, such as HEAD, another tab and the name that it stands for. A "
+            "name with \"^{}\" at its\nend gives the object that a tag leads to. Nobody is asked "
+            "anything, see clone.");
+    }
+
+    ExitStatus run(Session &session) override
+    {
+        const std::string name = remote_->results().front();
+        const auto remote = openRemote(session, *remote_);
+        RemoteNotes notes;
+        std::vector<git::GitRemoteHead> heads;
+        const ExitStatus status = runWithRemote(session, notes,
+                                                [&]
+                                                {
+                                                    heads = remote->getRemoteHeads();
+                                                    return Done;
+                                                });
+        if (status != Done)
+        {
+            return status;
+        }
+        for (const git::GitRemoteHead &head : heads)
+        {
+            writeRecord(session.output(), head);
+        }
+        session.output().flush();
+        remark(std::to_string(heads.size()) + (heads.size() == 1 ? " reference" : " references"));
+        return Done;
+    }
+
+  private:
+    void writeRecord(Output &output, const git::GitRemoteHead &head) const
+    {
+        std::string record = hexadecimal(head.oid) + '\t' + show(head.name);
+        if (!head.symrefTarget.empty())
+        {
+            record += '\t' + show(head.symrefTarget);
+        }
+        output.write(record + (endWithNul_ ? '\0' : '\n'));
+    }
+
+    std::string show(const std::string &name) const
+    {
+        return endWithNul_ ? name : quoteName(fl::i18n::utf8_to_ustring(name));
+    }
+
+    const CLI::Option *remote_ = nullptr;
+    bool endWithNul_ = false;
+};
+
+} // namespace
+
+std::unique_ptr<Command> makeHeadsCommand()
+{
+    return std::make_unique<HeadsCommand>();
+}
+
+} // namespace vclink::shell

@@ -1,0 +1,51 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <memory>
+#include <optional>
+#include <string>
+#include <vector>
+
+namespace vclink::shell
+{
+
+/// What a server made of a reference that was pushed.
+struct PushedReference
+{
+    std::string name;
+    /// the server's reason for rejecting it; empty when it was taken
+    std::string rejection;
+};
+
+/// What became known of an operation with a remote.
+struct RemoteNotes
+{
+    /// the kinds of credentials that the server asked for last, as libgit2's bits; nothing when it
+    /// asked for none
+    std::optional<unsigned> credentials;
+    /// how many references of the working copy changed
+    unsigned updated = 0;
+    std::vector<PushedReference> pushed;
+};
+
+/// Takes the note that a record of the library's log is of, if it is of any.
+void takeNote(RemoteNotes &notes, const std::string &record);
+
+/// While it lives, takes notes from the library's log: an operation with a remote tells its caller
+/// neither what credentials were asked for nor which references were rejected, and logs both. At
+/// most one object at a time.
+class RemoteLog
+{
+  public:
+    /// @param notes outlives the object
+    explicit RemoteLog(RemoteNotes &notes);
+    RemoteLog(const RemoteLog &) = delete;
+    RemoteLog &operator=(const RemoteLog &) = delete;
+    ~RemoteLog();
+
+  private:
+    struct Impl;
+    std::unique_ptr<Impl> impl_;
+};
+
+} // namespace vclink::shell
