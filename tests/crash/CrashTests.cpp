@@ -1,0 +1,150 @@
+// SPDX-License-Identifier: MIT
+#include <algorithm>
+#include <chrono>
+#include <cstdlib>
+#include <iostream>
+#include <map>
+#include <set>
+#include <string>
+#include <vector>
+
+#include <gtest/gtest.h>
+
+#include "Casualty.hpp"
+#include "Workplace.hpp"
+#include "differential/Comparison.hpp"
+#include "differential/Random.hpp"
+#include "support/GitTest.hpp"
+#include "support/LibGit2Session.hpp"
+
+namespace
+{
+
+using std::chrono::microseconds;
+using vclink::test::Casualty;
+using vclink::test::Comparison;
+using vclink::test::GitTest;
+using vclink::test::LibGit2Session;
+using vclink::test::Random;
+using vclink::test::Workplace;
+
+const std::vector<std::string> operations{
+    "commit", "revertFiles", "switchBranch", "mergeFastForward", "mergeThreeWay",
+    "fetch",  "push",        "generate",     "writeConfig"};
+
+std::uint64_t numberFrom(const char *variable, std::uint64_t otherwise)
+{
+    const char *text = std::getenv(variable);
+    return text == nullptr ? otherwise : std::strtoull(text, nullptr, 10);
+}
+
+/// Workers that are killed one after the other. VCLINK_KILLS says how many, VCLINK_SEED when.
+class Crash : public GitTest
+{
+  protected:
+    /// Has a worker repeat what the last one was killed in, and kills it in `operation`.
+    void killIn(const std::string &operation)
+    {
+        if (operation == "fetch" || last_ == "fetch")
+            workplace_.advanceUpstream();
+        Casualty worker({VCLINK_CRASH_WORKER, workplace_.path(),
+                         std::to_string(random_.below(1U << 30)), last_, operation});
+        ASSERT_TRUE(worker.awaitReports(2)) << last_ << " does not work after one was killed";
+        ASSERT_TRUE(worker.awaitReports(3)) << operation << " can't be prepared";
+        const auto longest = static_cast<std::size_t>(timeOf(operation).count());
+        worker.killAfter(microseconds(random_.below(longest)));
+        remember(worker);
+        const std::string interrupted = worker.interrupted();
+        ++(interrupted.empty() ? outside_[operation] : inside_[interrupted]);
+        last_ = operation;
+    }
+    void recover()
+    {
+        workplace_.expectNothingLost(commits_, pushed_);
+        locks_ += workplace_.removeLocks();
+        merges_ += workplace_.abortMerge() ? 1U : 0U;
+        Comparison(workplace_.repository(), random_.below(1U << 30)).compareAll();
+    }
+    void report() const
+    {
+        for (const auto &operation : operations)
+        {
+            const auto count = [&](const std::map<std::string, std::size_t> &kills)
+            { return kills.count(operation) == 0 ? std::size_t{0} : kills.at(operation); };
+            std::cout << operation << ": killed inside " << count(inside_) << ", after the end "
+                      << count(outside_) << ", a run took " << timeOf(operation).count() << " us\n";
+        }
+        std::cout << commits_.size() << " commits kept, " << locks_ << " locks removed, " << merges_
+                  << " merges aborted\n";
+    }
+    std::size_t inside() const
+    {
+        std::size_t sum = 0;
+        for (const auto &[operation, count] : inside_)
+            sum += count;
+        return sum;
+    }
+    const std::map<std::string, std::size_t> &killsInside() const
+    {
+        return inside_;
+    }
+
+  private:
+    microseconds timeOf(const std::string &operation) const
+    {
+        const auto found = times_.find(operation);
+        return found == times_.end() ? microseconds(20'000) : found->second;
+    }
+    /// The commits that stand, and how long the operations take that were let to their end.
+    void remember(const Casualty &worker)
+    {
+        const auto &reports = worker.reports();
+        for (std::size_t end = 1; end < reports.size(); ++end)
+        {
+            if (!reports[end].isEnd)
+                continue;
+            commits_.insert(reports[end].id);
+            if (reports[end].operation == "push")
+                pushed_.insert(reports[end].id);
+            const auto time =
+                std::chrono::duration_cast<microseconds>(reports[end].time - reports[end - 1].time);
+            times_[reports[end].operation] = std::max(time, microseconds(500));
+        }
+    }
+
+    LibGit2Session session_{environment()};
+    Workplace workplace_{folder() / "workplace", environment().home()};
+    Random random_{numberFrom("VCLINK_SEED", 1)};
+    std::string last_ = "commit";
+    std::map<std::string, microseconds> times_;
+    std::map<std::string, std::size_t> inside_;
+    std::map<std::string, std::size_t> outside_;
+    std::set<std::string> commits_;
+    std::set<std::string> pushed_;
+    std::size_t locks_ = 0;
+    std::size_t merges_ = 0;
+};
+
+TEST_F(Crash, LosesNothingAndTheNextOperationWorks)
+{
+    const auto kills = static_cast<std::size_t>(numberFrom("VCLINK_KILLS", 27));
+    // Some more where the machine was too slow or too fast for the moments that were chosen.
+    const std::size_t most = kills + 5 * operations.size();
+    for (std::size_t kill = 0; kill < most && !HasFailure(); ++kill)
+    {
+        const std::string &operation = operations[kill % operations.size()];
+        if (kill >= kills && killsInside().count(operation) != 0)
+            continue;
+        SCOPED_TRACE("kill " + std::to_string(kill));
+        killIn(operation);
+        if (!HasFatalFailure())
+            recover();
+    }
+    report();
+    // Else it proves nothing.
+    EXPECT_GE(inside() * 2, kills);
+    for (const auto &operation : operations)
+        EXPECT_EQ(killsInside().count(operation), 1U) << "no kill fell into " << operation;
+}
+
+} // namespace
