@@ -1,113 +1,27 @@
 // SPDX-License-Identifier: MIT
 #include "LibGit2Calls.hpp"
 
-#include <stdexcept>
-#include <utility>
+#include "passToLibGit2.hpp"
 
-#include <dlfcn.h>
-
-namespace
-{
-
-vclink::test::LibGit2Calls *current = nullptr;
-int depth = 0;
-
-template <class Function> Function *findReal(const char *name)
-{
-    void *const symbol = ::dlsym(RTLD_NEXT, name);
-    if (symbol == nullptr)
-        throw std::runtime_error(name);
-    return reinterpret_cast<Function *>(symbol);
-}
-
-/// A call that passes through, noted unless libgit2 makes it of itself.
-class Passing
-{
-  public:
-    explicit Passing(const char *name) : isNoted_(current != nullptr && depth == 0)
-    {
-        if (isNoted_)
-            current->names.emplace_back(name);
-        ++depth;
-    }
-    Passing(const Passing &) = delete;
-    Passing &operator=(const Passing &) = delete;
-    ~Passing()
-    {
-        --depth;
-    }
-
-    bool isNoted() const noexcept
-    {
-        return isNoted_;
-    }
-
-  private:
-    bool isNoted_;
-};
-
-/// @return the code to answer instead of calling libgit2, or 0
-int injected(const Passing &passing, const char *name)
-{
-    if (!passing.isNoted())
-        return 0;
-    const auto found = current->failing.find(name);
-    if (found == current->failing.end())
-        return 0;
-    git_error_set_str(GIT_ERROR_OS, "injected");
-    return found->second;
-}
-
-template <class Function, class... Arguments>
-int pass(const char *name, Function *, Arguments... arguments)
-{
-    const Passing passing(name);
-    if (const int code = injected(passing, name); code != 0)
-        return code;
-    return findReal<Function>(name)(arguments...);
-}
-
-/// As pass(), of a call that gives out a handle.
-template <class Handle, class Function, class... Arguments>
-int passAcquiring(const char *name, Function *, Handle **out, Arguments... arguments)
-{
-    const Passing passing(name);
-    if (const int code = injected(passing, name); code != 0)
-        return code;
-    const int code = findReal<Function>(name)(out, arguments...);
-    if (passing.isNoted() && code == 0 && out != nullptr)
-        current->handles.insert(*out);
-    return code;
-}
-
-/// Of a call that takes a handle back.
-template <class Handle> void passReleasing(const char *name, Handle *handle)
-{
-    const Passing passing(name);
-    if (passing.isNoted())
-        current->handles.erase(handle);
-    findReal<void(Handle *)>(name)(handle);
-}
-
-template <class Hook, class... Arguments> void tell(Hook hook, Arguments... arguments)
-{
-    if (current != nullptr && depth == 0 && current->*hook)
-        (current->*hook)(arguments...);
-}
-
-} // namespace
+using vclink::test::detail::current;
+using vclink::test::detail::findReal;
+using vclink::test::detail::pass;
+using vclink::test::detail::passAcquiring;
+using vclink::test::detail::Passing;
+using vclink::test::detail::passReleasing;
+using vclink::test::detail::tell;
 
 namespace vclink::test
 {
 
 LibGit2Calls::LibGit2Calls()
 {
-    current = this;
+    detail::current = this;
 }
 
 LibGit2Calls::~LibGit2Calls()
 {
-    current = nullptr;
+    detail::current = nullptr;
 }
 
 } // namespace vclink::test

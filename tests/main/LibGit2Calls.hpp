@@ -34,6 +34,9 @@ class LibGit2Calls
     /// class GIT_ERROR_OS and the text "injected".
     std::map<std::string, int> failing;
 
+    /// Told of each call, before it is made, where it is set.
+    std::function<void(const std::string &name)> onCall;
+
     /// What answers in libgit2's place where it is set. The replacement of the walk is given the
     /// real one as well.
     using Walk = int (*)(git_repository *, const git_status_options *, git_status_cb, void *);
@@ -66,6 +69,20 @@ class LibGit2Calls
                        const git_signature *committer, const char *encoding, const char *message,
                        std::size_t parents)>
         onCommitCreate;
+    std::function<void(const char *name)> onRemoteLookup;
+    std::function<void(const git_strarray *refspecs, const git_fetch_options *options,
+                       const char *reflogMessage)>
+        onFetch;
+    std::function<void(const git_strarray *refspecs, const git_push_options *options)> onPush;
+    std::function<void(git_direction direction, const git_remote_callbacks *callbacks,
+                       const git_proxy_options *proxy, const git_strarray *headers)>
+        onConnect;
+    std::function<void(const char *url, const char *path, const git_clone_options *options)>
+        onClone;
+
+    /// What answers in libgit2's place where it is set.
+    std::function<int(git_repository **)> cloneInstead;
+    std::function<int(const git_remote_head ***heads, std::size_t *count)> listInstead;
 };
 
 } // namespace vclink::test

@@ -8,8 +8,8 @@
 namespace vclink::test
 {
 
-/// A host's own factory, which tells when it is asked for the options of a status walk or of a
-/// checkout and when it goes.
+/// A host's own factory, which tells when it is asked for the options of a clone, a status walk or
+/// a checkout and when it goes.
 class TestOptionsFactory : public git::GitOptionsFactory
 {
   public:
@@ -21,7 +21,9 @@ class TestOptionsFactory : public git::GitOptionsFactory
     }
     git::CloneOptions makeCloneOptions() override
     {
-        return {};
+        if (onCloneOptions)
+            onCloneOptions();
+        return cloneOptions;
     }
     git::FetchOptions makeFetchOptions() override
     {
@@ -52,6 +54,8 @@ class TestOptionsFactory : public git::GitOptionsFactory
         return {};
     }
 
+    std::function<void()> onCloneOptions;
+    git::CloneOptions cloneOptions;
     std::function<void()> onStatusOptions;
     std::function<void()> onCheckoutOptions;
     git::CheckoutOptions checkoutOptions;
