@@ -42,9 +42,10 @@ class VCLINK_GIT_EXPORT GitRemote
     virtual ~GitRemote();
 
     /// Takes objects from the remote and moves the references that the refspecs name,
-    /// remote-tracking branches as a rule. Tags come along that point at what was taken; branches
-    /// that the remote has deleted stay unless its `prune` is configured. Working tree, index and
-    /// local branches stay as they are, unless a refspec names one. After a failure or a
+    /// remote-tracking branches as a rule. Tags come along that point at what was taken, of a
+    /// repository on this machine all of them; branches that the remote has deleted stay unless its
+    /// `prune` is configured. Working tree, index and local branches stay as they are, unless a
+    /// refspec names one. After a failure or a
     /// cancellation objects may have been taken, and references moved in part. git_remote_fetch.
     /// @param refspecs taken as they stand, e.g. "+refs/heads/*:refs/remotes/origin/*"; an empty
     /// list means those that are configured
@@ -55,10 +56,13 @@ class VCLINK_GIT_EXPORT GitRemote
     /// Gives objects to the remote and moves its references. A reference that the remote rejects,
     /// by a hook or by its settings, counts as done: its words are in the log only, and
     /// getRemoteHeads() shows where the reference stands. One that can't be fast-forwarded, and
-    /// whose refspec does not begin with '+', is a failure, and then nothing is pushed.
+    /// whose refspec does not begin with '+', is a failure, and then nothing is pushed. A
+    /// repository on this machine takes a push only when it is bare, and runs no hooks.
     /// git_remote_push.
-    /// @param refspecs taken as they stand, e.g. "refs/heads/main:refs/heads/main"; ":NAME"
-    /// deletes. An empty list means those that are configured
+    /// @param refspecs taken as they stand, with full names, e.g.
+    /// "refs/heads/main:refs/heads/main";
+    /// ":NAME" deletes. An empty list means those that are configured, and pushes nothing where
+    /// none are
     /// @throws vclink::util::exception::CancelledOperationException when the application asked for
     /// it and the remote then talks; at no other moment can a push be stopped
     virtual void push(const std::vector<ustring> &refspecs) = 0;
