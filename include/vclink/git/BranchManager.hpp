@@ -24,6 +24,7 @@ namespace vclink::git
 class VCLINK_GIT_EXPORT BranchManager
 {
   public:
+    /// UTF-8; a short name, or what an operation says it takes.
     using BranchName = std::string;
 
     /// @param adapter one that GitAdapterFactory has made; must outlive the manager

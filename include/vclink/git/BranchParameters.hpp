@@ -16,7 +16,9 @@ class VCLINK_GIT_EXPORT BranchParameters
     /// @param startPoint the name of a reference that points at a commit itself, UTF-8
     BranchParameters(const std::string &name, const std::string &startPoint);
 
+    /// The branch's short name.
     std::string getName() const;
+    /// The name of the reference that it begins at.
     std::string getStartPoint() const;
 
   private:

@@ -14,6 +14,7 @@ class VCLINK_GIT_EXPORT BranchPointer
   public:
     /// @param name UTF-8
     explicit BranchPointer(const std::string &name);
+    /// The same, without a copy.
     explicit BranchPointer(std::string &&name) noexcept;
 
     /// The name, UTF-8: of a list the full name of the reference, of BranchManager's

@@ -22,7 +22,9 @@ class VCLINK_GIT_EXPORT CloneOptions
     bool bare;
     /// The branch to check out, UTF-8; the remote's default branch when empty.
     boost::optional<std::string> checkoutBranch;
+    /// For the files.
     CheckoutOptions checkoutOptions;
+    /// For the transfer.
     FetchOptions fetchOptions;
 };
 

@@ -13,6 +13,7 @@ class VCLINK_GIT_EXPORT FetchOptions
   public:
     FetchOptions();
 
+    /// For the connection.
     ProxyOptions proxyOptions;
 };
 

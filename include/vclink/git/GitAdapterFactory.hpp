@@ -77,6 +77,7 @@ class VCLINK_GIT_EXPORT GitAdapterFactory : public vclink::CMAdapterFactory
     /// The index on disk is written whole or not at all. While another process holds its lock, the
     /// operations that change it fail and change nothing.
     ///
+    /// @param root the root of the working tree
     /// @param interactor not null; shared for the adapter's life
     /// @throws std::bad_alloc
     std::unique_ptr<CMAdapter>

@@ -25,6 +25,7 @@ class VCLINK_GIT_EXPORT GitAttribute
     /// `name=value`
     struct Value
     {
+        /// The text behind the equals sign.
         ustring value;
     };
     /// Nothing says anything, or `!name`.
@@ -32,7 +33,9 @@ class VCLINK_GIT_EXPORT GitAttribute
     {
     };
 
+    /// The attribute's name.
     ustring name;
+    /// Which of the four it is.
     std::variant<Set, Unset, Value, Unspecified> attributeValue;
 };
 

@@ -31,6 +31,7 @@ class VCLINK_GIT_EXPORT GitAttributes
     /// What the attribute files of the working tree, and then those of the index, say. `name=` with
     /// nothing behind it counts as set. git_attr_get.
     /// @param path relative to the root of the working tree; the file need not exist
+    /// @param name the attribute's name
     /// @throws LibGit2Exception; GitException with the message
     /// shared_vclink::git::InvalidGitAttributeValue for an answer of an unknown kind
     virtual GitAttribute getAttribute(const upath &path, const ustring &name) = 0;

@@ -24,6 +24,7 @@ class VCLINK_GIT_EXPORT GitException : public foundation::core::except::IMsgIDEx
     /// @param message is copied, its arguments with it
     /// @param addedText follows the message's text on a line of its own; may be empty
     GitException(const resource_core::BaseMsgID &message, const ustring &addedText);
+    /// Without an added text.
     explicit GitException(const resource_core::BaseMsgID &message);
     /// A deep copy, the recorded stack included.
     GitException(const GitException &other);

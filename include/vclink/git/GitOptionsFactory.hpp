@@ -35,12 +35,19 @@ class VCLINK_GIT_EXPORT GitOptionsFactory
     static std::unique_ptr<GitOptionsFactory>
     makeDefault(std::shared_ptr<ApplicationInteractor> interactor);
 
+    /// For a clone.
     virtual CloneOptions makeCloneOptions() = 0;
+    /// For a fetch.
     virtual FetchOptions makeFetchOptions() = 0;
+    /// For a listing of a remote, and what others nest.
     virtual ProxyOptions makeProxyOptions() = 0;
+    /// For a push.
     virtual PushOptions makePushOptions() = 0;
+    /// For a checkout.
     virtual CheckoutOptions makeCheckoutOptions() = 0;
+    /// For a walk over the states of files.
     virtual StatusOptions makeStatusOptions() = 0;
+    /// For a merge.
     virtual MergeOptions makeMergeOptions() = 0;
 
     /// A further share of the interactor.

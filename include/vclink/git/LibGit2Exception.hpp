@@ -13,7 +13,9 @@ namespace vclink::git
 class VCLINK_GIT_EXPORT LibGit2Exception : public GitException
 {
   public:
+    /// Copies the failure.
     explicit LibGit2Exception(const GitError &error);
+    /// A deep copy, the recorded stack included.
     LibGit2Exception(const LibGit2Exception &other);
     ~LibGit2Exception() noexcept override;
 

@@ -15,8 +15,11 @@ class VCLINK_GIT_EXPORT LibGit2Version
   public:
     LibGit2Version();
 
+    /// 1 of 1.5.0.
     int getMajor() const noexcept;
+    /// 5 of 1.5.0.
     int getMinor() const noexcept;
+    /// 0 of 1.5.0.
     int getRevision() const noexcept;
     /// The three numbers in decimal, a dot between each two.
     std::string toString() const;

@@ -17,6 +17,7 @@ class VCLINK_GIT_EXPORT PushOptions
 
     /// How many threads pack objects; 1 at the start.
     std::uint32_t packbuilderParallelism;
+    /// For the connection.
     ProxyOptions proxyOptions;
 };
 
