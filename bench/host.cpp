@@ -65,4 +65,9 @@ std::unique_ptr<CMAdapter> makeAdapter(const upath &root)
     return git::GitAdapterFactory().createAdapterFor(root, std::make_shared<Interactor>());
 }
 
+std::unique_ptr<WorkingCopyGenerator> makeGenerator()
+{
+    return git::GitAdapterFactory().createWorkingCopyGenerator(std::make_shared<Interactor>());
+}
+
 } // namespace vclink::bench

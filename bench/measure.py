@@ -13,6 +13,7 @@ import working_copies
 from branches import BranchBench
 from changes import ChangeBench
 from programs import Programs, Ratios
+from remotes import RemoteBench
 from report import Table, write_into
 
 SIZES = {1_000: 31, 10_000: 15, 100_000: 7}  # files: rounds of paired runs
@@ -41,21 +42,28 @@ class Bench:
         self._programs = Programs(build, scratch)
         self._changes = ChangeBench(self._programs, scratch)
         self._branches = BranchBench(self._programs, scratch)
+        self._remotes = RemoteBench(self._programs, scratch)
         self._sizes = sizes
         self._scratch = scratch
         # Short names, since the root stands in every key of the result.
         self._roots = {size: os.path.join(scratch, name) for size, name in zip(sizes, "abc")}
 
-    def make_working_copies(self):
+    def serving(self):
+        """A context in which there are servers for what is measured with them."""
         home = os.path.join(self._scratch, "home")
         os.mkdir(home)
-        env = working_copies.environment(home)
+        self._env = working_copies.environment(home)
+        return self._remotes.serve(self._env)
+
+    def make_working_copies(self):
+        env = self._env
         for size, root in self._roots.items():
             working_copies.make_working_copy(root, size, env)
             for count in LISTS:
                 working_copies.write_list(self._list(size, count), count, size)
         self._changes.make_working_copies(env)
         self._branches.make_working_copies(env)
+        self._remotes.make_working_copies(env)
 
     def _list(self, size, count):
         return f"{self._roots[size]}.{count}"
@@ -72,6 +80,7 @@ class Bench:
         tasks = {
             **self._changes.tasks(),
             **self._branches.tasks(),
+            **self._remotes.tasks(),
             ("less", "instructions"): lambda: programs.instructions(
                 "library", "less", some, self._list(self._sizes[0], 1_000)),
             ("less", "allocations"): lambda: programs.allocations(
@@ -110,11 +119,12 @@ class Bench:
                 [("floor", *arguments), ("library", *arguments)], LIST_ROUNDS)
         self._changes.clock()
         self._branches.clock()
+        self._remotes.clock()
 
     def tables(self):
         return [self._folder_table(), self._files_table(),
                 self._changes.table(self._counted), self._branches.table(self._counted),
-                self._small_table()]
+                self._remotes.table(self._counted), self._small_table()]
 
     def _per_file(self, program):
         return {size: self._counted["folder", program, size] / size for size in self._sizes}
@@ -216,11 +226,12 @@ def main():
     options = parse()
     sizes = list(SIZES)[:2] if options.quick else list(SIZES)
     bench = Bench(options.build, options.scratch, sizes)
-    for what, step in (("making working copies", bench.make_working_copies),
-                       ("counting instructions and allocations", bench.count),
-                       ("timing", bench.clock)):
-        print(f"== {what}", file=sys.stderr, flush=True)
-        step()
+    with bench.serving():
+        for what, step in (("making working copies", bench.make_working_copies),
+                           ("counting instructions and allocations", bench.count),
+                           ("timing", bench.clock)):
+            print(f"== {what}", file=sys.stderr, flush=True)
+            step()
     tables = bench.tables()
     text = "\n\n".join([describe(len(options.scratch) + 2), *map(str, tables)])
     print(text)

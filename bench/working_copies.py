@@ -41,9 +41,10 @@ def git(root, env, *arguments, **options):
     subprocess.run(["git", "-C", root, *arguments], env=env, check=True, **options)
 
 
-def make_repository(root, env):
+def make_repository(root, env, *options):
     """An empty repository."""
-    subprocess.run(["git", "init", "--quiet", "--initial-branch=main", root], env=env, check=True)
+    subprocess.run(["git", "init", "--quiet", "--initial-branch=main", *options, root], env=env,
+                   check=True)
     # libgit2 reads no identity from the environment.
     for name, value in (("user.name", "bench"), ("user.email", "bench@localhost"), ("gc.auto", "0")):
         git(root, env, "config", name, value)
