@@ -129,7 +129,7 @@ TEST_F(ShellSshAccess, SaysThatTheAddressNamesNoUser)
 
 TEST_F(ShellSshAccess, SaysThatNoPasswordIsGiven)
 {
-    SshServer other(SshServer::Offers::passwords);
+    SshServer other(SshServer::Offers::Passwords);
     EXPECT_EQ(refuse(other.url(other.makeRepository())),
               "vclink-shell: The server asked for a password, and none is ever given: only an ssh "
               "agent is asked, for keys.\n");
@@ -163,7 +163,7 @@ class ShellPasswordAccess : public AccessTest<WebServer>
   protected:
     static void SetUpTestSuite()
     {
-        start(WebServer::Site::httpWithPassword);
+        start(WebServer::Site::HttpWithPassword);
     }
 };
 
@@ -177,7 +177,7 @@ TEST_F(ShellPasswordAccess, IsRefusedWithoutAQuestion)
 TEST_F(ShellPasswordAccess, IsNoMatterWhereNobodyAsks)
 {
     const GitRepository repository = server().makeRepository();
-    const std::string open = server().urlAt(WebServer::Site::http, repository);
+    const std::string open = server().urlAt(WebServer::Site::Http, repository);
     EXPECT_EQ(clone(open).errors, "");
     std::filesystem::remove_all(folder() / "clone");
     EXPECT_THAT(refuse(open + "/missing"), Not(HasSubstr("password")));
