@@ -45,8 +45,9 @@ class VCLINK_GIT_EXPORT GitRemote
     /// remote-tracking branches as a rule. Tags come along that point at what was taken, of a
     /// repository on this machine all of them; branches that the remote has deleted stay unless its
     /// `prune` is configured. Working tree, index and local branches stay as they are, unless a
-    /// refspec names one. After a failure or a
-    /// cancellation objects may have been taken, and references moved in part. git_remote_fetch.
+    /// refspec names one. After a failure or a cancellation objects may have been taken, and
+    /// references moved in part. A request for cancellation that ended a fetch still stops the next
+    /// checkout of the adapter at its first file. git_remote_fetch.
     /// @param refspecs taken as they stand, e.g. "+refs/heads/*:refs/remotes/origin/*"; an empty
     /// list means those that are configured
     /// @throws vclink::util::exception::CancelledOperationException when the application asked for
@@ -60,9 +61,8 @@ class VCLINK_GIT_EXPORT GitRemote
     /// repository on this machine takes a push only when it is bare, and runs no hooks.
     /// git_remote_push.
     /// @param refspecs taken as they stand, with full names, e.g.
-    /// "refs/heads/main:refs/heads/main";
-    /// ":NAME" deletes. An empty list means those that are configured, and pushes nothing where
-    /// none are
+    /// "refs/heads/main:refs/heads/main"; ":NAME" deletes. An empty list means those that are
+    /// configured, and pushes nothing where none are
     /// @throws vclink::util::exception::CancelledOperationException when the application asked for
     /// it and the remote then talks; at no other moment can a push be stopped
     virtual void push(const std::vector<ustring> &refspecs) = 0;

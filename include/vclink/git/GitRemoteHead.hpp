@@ -25,8 +25,7 @@ class VCLINK_GIT_EXPORT GitRemoteHead
     /// What it points at here, if libgit2 looked; otherwise zeros.
     Id loid = {};
     /// The reference's full name, UTF-8; "HEAD" for the remote's HEAD. The name of a tag followed
-    /// by
-    /// "^{}" stands for the object that the tag names.
+    /// by "^{}" stands for the object that the tag names.
     std::string name;
     /// The name of the reference that this one stands for, UTF-8; empty when it stands for none, or
     /// the remote does not tell.

@@ -33,9 +33,10 @@ class VCLINK_GIT_EXPORT GitWorkingCopyGenerator : public vclink::WorkingCopyGene
     /// tells. Runs to its end on the calling thread, which has SIGPIPE blocked meanwhile.
     ///
     /// After a failure or a cancellation libgit2 removes what it made: the folder, or what it put
-    /// into one that was there. The object is as good as new, save for one thing: a cancellation
-    /// that ended the transfer still waits for the next checkout of this object, which stops at its
-    /// first file. git_clone.
+    /// into one that was there. The object is as good as new, save for one thing: transfer and
+    /// checkout each remember a request for cancellation, so that one that ended the transfer still
+    /// stops the next checkout of this object at its first file, and one that ended a checkout the
+    /// next transfer. git_clone.
     /// @param repositorySpecifier a URL, `user@host:path`, or a path on this machine, which may be
     /// relative to the process's working folder; taken as it stands
     /// @param sandboxRoot the folder of the working copy: missing, or empty; taken as it stands
