@@ -3,7 +3,9 @@
 #include <vector>
 
 #include <git2/commit.h>
+#include <git2/errors.h>
 #include <git2/index.h>
+#include <git2/object.h>
 #include <git2/oid.h>
 #include <git2/repository.h>
 
@@ -44,6 +46,20 @@ std::vector<OwnedHandle<git_commit>> lookupMergeHeads(git_repository *repository
         commits.push_back(acquire<git_commit>(git_commit_lookup, repository, &id).value());
     }
     return commits;
+}
+
+/// libgit2 1.5 answers with success, and has moved no branch, when it can't write the commit's
+/// object, on a full disk for example. All that tells then is that there is no such object, and the
+/// error record, which stands until the next call.
+void throwIfNotWritten(git_repository *repository, const git_oid &id)
+{
+    const GitError failure(GIT_ERROR);
+    const auto commit = acquire<git_object>(git_object_lookup, repository, &id, GIT_OBJECT_COMMIT);
+    if (commit.has_error() && commit.error().getCode() == GIT_ENOTFOUND)
+    {
+        GitErrorPolicy::throwIfError(failure);
+    }
+    commit.value();
 }
 
 } // namespace
@@ -88,6 +104,7 @@ void GitAdapter::createCommit(git_repository *repository, const ustring &message
                                  text.c_str(), tree.get(), parentPointers.size(),
                                  parentPointers.data()))
         .value();
+    throwIfNotWritten(repository, id);
     makeResult(git_repository_state_cleanup(repository)).value();
 }
 

@@ -107,6 +107,9 @@ void Worker::change(const std::string &folder)
     for (int file = 0; file < filesInFolder; ++file)
     {
         std::ofstream stream(root_ / folder / std::to_string(file));
+        // Of another size each time: git may take an edit that keeps the size for none within the
+        // second in which libgit2 wrote the index.
+        stream << std::string(static_cast<std::size_t>(random_.below(50'000)), 'x') << '\n';
         for (int line = 0; line < linesInFile; ++line)
             stream << random_.below(1'000'000'000) << '\n';
     }

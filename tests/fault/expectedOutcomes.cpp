@@ -107,6 +107,14 @@ std::vector<Tolerance> tolerancesOf(const std::string &operation, const std::str
         {"commit", "git_commit_lookup", 1, any, otherTip},
         // A state that is none of a merge's is not looked at.
         {"commit", "git_repository_state", any, any, normal},
+        // There is no commit then, for all one knows, with a text that is none or an old one. A
+        // fast-forward makes none, and looks for the one that it goes to.
+        {"mergeFastForward", "git_object_lookup", any, GIT_ENOTFOUND,
+         failureIn(operation, GIT_ENOTFOUND, GIT_ERROR_OS, injectedText)},
+        {"merge", "git_object_lookup", any, GIT_ENOTFOUND, failureIn(operation, GIT_ERROR, 0, "")},
+        {"commitFirst", "git_object_lookup", any, GIT_ENOTFOUND,
+         failure(GIT_ERROR, GIT_ERROR_REFERENCE, "reference 'refs/heads/main' not found")},
+        {"commit", "git_object_lookup", any, GIT_ENOTFOUND, failure(GIT_ERROR, 0, "")},
         // The identity comes from the environment then.
         {"", "git_signature_default", any, GIT_ENOTFOUND, normal},
         // A file that is there, and not in the refreshed index, was missed.

@@ -58,8 +58,9 @@ TEST_F(CommitCalls, ComeInTheirOrderAndReleaseInReverse)
                             "git_reference_free", "git_repository_state", "git_signature_default",
                             "git_repository_index", "git_index_update_all", "git_index_write",
                             "git_index_write_tree", "git_tree_lookup", "git_commit_create",
-                            "git_repository_state_cleanup", "git_tree_free", "git_index_free",
-                            "git_signature_free", "git_commit_free", "git_repository_free"));
+                            "git_object_lookup", "git_object_free", "git_repository_state_cleanup",
+                            "git_tree_free", "git_index_free", "git_signature_free",
+                            "git_commit_free", "git_repository_free"));
     EXPECT_THAT(calls_->handles, IsEmpty());
 }
 
@@ -302,6 +303,19 @@ TEST_F(CommitCalls, ThatFailToEndTheMergeLeaveTheCommit)
     const auto underWay = stateOf(repository_).underWay;
     startNoting();
     calls_->failing = {{"git_repository_state_cleanup", -42}};
+    EXPECT_EQ(failureOf([this] { commitOnce(); }), (Failure{-42, GIT_ERROR_OS, "injected"}));
+    EXPECT_THAT(calls_->handles, IsEmpty());
+    EXPECT_THAT(parents(), ElementsAre(head, idOf("theirs")));
+    EXPECT_EQ(stateOf(repository_).underWay, underWay);
+}
+
+TEST_F(CommitCalls, ThatFailToSeeTheCommitLeaveItAndTheMerge)
+{
+    beginMerge({"file"});
+    const std::string head = idOf("HEAD");
+    const auto underWay = stateOf(repository_).underWay;
+    startNoting();
+    calls_->failing = {{"git_object_lookup", -42}};
     EXPECT_EQ(failureOf([this] { commitOnce(); }), (Failure{-42, GIT_ERROR_OS, "injected"}));
     EXPECT_THAT(calls_->handles, IsEmpty());
     EXPECT_THAT(parents(), ElementsAre(head, idOf("theirs")));

@@ -151,6 +151,12 @@ int git_checkout_index(git_repository *repository, git_index *index,
     return pass("git_checkout_index", git_checkout_index, repository, index, options);
 }
 
+int git_object_lookup(git_object **out, git_repository *repository, const git_oid *id,
+                      git_object_t type)
+{
+    return passAcquiring("git_object_lookup", git_object_lookup, out, repository, id, type);
+}
+
 void git_object_free(git_object *object)
 {
     passReleasing("git_object_free", object);
