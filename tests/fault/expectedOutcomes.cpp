@@ -86,25 +86,22 @@ std::string missed(const std::string &file)
                    "could not read '" + file + "', which is tracked: Input/output error");
 }
 
-std::vector<Tolerance> tolerancesOf(const std::string &operation, const std::string &normal)
+std::string otherTip(const std::string &operation)
 {
-    const std::string otherTip = failureIn(operation, GIT_EMODIFIED, GIT_ERROR_OBJECT,
-                                           "failed to create commit: current tip is not the first "
-                                           "parent");
-    const std::string hasConflicts = mergeFailure(textOf(shared_vclink::git::HasConflicts()));
-    const std::string badState =
-        mergeFailure(textOf(shared_vclink::git::UnableToMergeBadRepositoryState()));
-    const std::string linkInTheWay = failure(
-        GIT_ECONFLICT, GIT_ERROR_CHECKOUT, "the symbolic link 'sub' is in the way of the checkout");
+    return failureIn(operation, GIT_EMODIFIED, GIT_ERROR_OBJECT,
+                     "failed to create commit: current tip is not the first parent");
+}
+
+std::vector<Tolerance> tolerancesOfCommits(const std::string &operation, const std::string &normal)
+{
+    const std::string isOtherTip = otherTip(operation);
     return {
-        // Only a missing folder is no failure of a probe.
-        {"isAdapterFor", "git_repository_open_ext", any, GIT_ENOTFOUND, "done: 0"},
         // A HEAD that can't be read makes the commit a first one, which libgit2 refuses.
         {"commitFirst", "git_reference_dwim", any, any, normal},
         {"commitUnreadable", "git_reference_dwim", any, any, normal},
         {"commitUnreadable", "git_commit_lookup", any, any, normal},
-        {"commit", "git_reference_dwim", 1, any, otherTip},
-        {"commit", "git_commit_lookup", 1, any, otherTip},
+        {"commit", "git_reference_dwim", 1, any, isOtherTip},
+        {"commit", "git_commit_lookup", 1, any, isOtherTip},
         // A state that is none of a merge's is not looked at.
         {"commit", "git_repository_state", any, any, normal},
         // There is no commit then, for all one knows, with a text that is none or an old one. A
@@ -129,6 +126,20 @@ std::vector<Tolerance> tolerancesOf(const std::string &operation, const std::str
         {"commit", "git_index_find", any, GIT_ENOTFOUND, normal},
         // The text of the failure is the injected one then.
         {"commit", "git_error_set_str", any, any, failure(GIT_ERROR, GIT_ERROR_OS, injectedText)},
+    };
+}
+
+std::vector<Tolerance> tolerancesOfOthers(const std::string &operation, const std::string &normal)
+{
+    const std::string isOtherTip = otherTip(operation);
+    const std::string hasConflicts = mergeFailure(textOf(shared_vclink::git::HasConflicts()));
+    const std::string badState =
+        mergeFailure(textOf(shared_vclink::git::UnableToMergeBadRepositoryState()));
+    const std::string linkInTheWay = failure(
+        GIT_ECONFLICT, GIT_ERROR_CHECKOUT, "the symbolic link 'sub' is in the way of the checkout");
+    return {
+        // Only a missing folder is no failure of a probe.
+        {"isAdapterFor", "git_repository_open_ext", any, GIT_ENOTFOUND, "done: 0"},
         // Without a HEAD the files are taken out of the index.
         {"revert", "git_revparse_single", any, any, normal},
         // The end of a list.
@@ -150,14 +161,22 @@ std::vector<Tolerance> tolerancesOf(const std::string &operation, const std::str
         {"merge", "git_index_has_conflicts", any, any, hasConflicts},
         // The first look-up chooses the words of the message, the second is the commit's.
         {"merge", "git_reference_dwim", 1, any, normal},
-        {"merge", "git_reference_dwim", 2, any, otherTip},
-        {"merge", "git_commit_lookup", 1, any, otherTip},
+        {"merge", "git_reference_dwim", 2, any, isOtherTip},
+        {"merge", "git_commit_lookup", 1, any, isOtherTip},
         // Without its command a driver leaves the file to libgit2's own merge.
         {"mergeByTool", "git_config_get_entry", any, any, hasConflicts},
         // No value is what the reads of the configuration make of every failure.
         {"globalFilePath", "git_config_find_global", any, any, "done: nothing"},
         {"read", "git_config_get_string_buf", any, any, "done: nothing"},
     };
+}
+
+std::vector<Tolerance> tolerancesOf(const std::string &operation, const std::string &normal)
+{
+    std::vector<Tolerance> all = tolerancesOfCommits(operation, normal);
+    const std::vector<Tolerance> others = tolerancesOfOthers(operation, normal);
+    all.insert(all.end(), others.begin(), others.end());
+    return all;
 }
 
 } // namespace

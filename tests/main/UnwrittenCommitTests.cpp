@@ -15,7 +15,6 @@ namespace
 {
 
 using testing::ElementsAre;
-using vclink::test::Failure;
 using vclink::test::RepositoryState;
 using vclink::test::stateOf;
 
