@@ -247,18 +247,20 @@ TEST_F(RemoteCalls, OfAListingAreCopiedWhole)
     first.symref_target = target.data();
     git_remote_head second = {};
     second.local = -2;
-    const git_remote_head *list[] = {&first, &second};
+    const git_remote_head third = {};
+    const git_remote_head *list[] = {&first, &second, &third};
     calls_.listInstead = [&](const git_remote_head ***heads, std::size_t *count)
     {
         *heads = list;
-        *count = 2;
+        *count = 3;
         return 0;
     };
     const auto heads = remote().getRemoteHeads();
     name.assign(name.size(), 'x');
     target.assign(target.size(), 'x');
-    ASSERT_EQ(heads.size(), 2U);
-    EXPECT_EQ(heads.capacity(), 2U);
+    ASSERT_EQ(heads.size(), 3U);
+    // A list that grew would have room for four.
+    EXPECT_EQ(heads.capacity(), 3U);
     EXPECT_EQ(heads[0].local, 1);
     EXPECT_THAT(heads[0].oid, testing::ElementsAreArray(first.oid.id));
     EXPECT_THAT(heads[0].loid, testing::ElementsAreArray(first.loid.id));
