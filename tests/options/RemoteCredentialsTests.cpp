@@ -64,7 +64,7 @@ class RemoteCredentials : public testing::Test
         EXPECT_EQ(key->passphrase, nullptr);
     }
 
-    const test::HermeticLibGit2 libgit2_;
+    test::HermeticLibGit2 libgit2_;
     test::TestInteractor interactor_;
     RemoteCallbacks callbacks_{interactor_};
 };
