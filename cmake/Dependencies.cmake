@@ -1,5 +1,5 @@
 # SPDX-License-Identifier: MIT
-# The libraries that the library and its programs are built on. Reasons: README, "Dependencies".
+# The libraries that the library and its programs are built on. Reasons: docs/linking.md.
 find_package(PkgConfig REQUIRED)
 # libgit2 comes with a CMake package only from 1.9 on.
 pkg_check_modules(libgit2 REQUIRED IMPORTED_TARGET libgit2>=1.0)
