@@ -14,6 +14,7 @@
 
 #include "error/errorUtil/GitResult.hpp"
 #include "error/errorUtil/raiseSystemError.hpp"
+#include "util/repository.hpp"
 
 namespace vclink::git
 {
@@ -117,8 +118,7 @@ void refreshIndex(git_repository *repository, git_index *index)
     makeResult(git_index_update_all(index, nullptr, nullptr, nullptr)).value();
     if (git_index_entrycount(index) < countBefore)
     {
-        const OwnedHandle<git_index> before =
-            acquire<git_index>(git_index_open, git_index_path(index)).value();
+        const OwnedHandle<git_index> before = openIndex(git_index_path(index));
         restoreDropped(repository, index, before.get());
     }
 }

@@ -49,21 +49,23 @@ std::vector<std::string> changedNames(const FileStateMap &states, const upath &r
     return names;
 }
 
-bool areIndexed(git_repository *repository, const std::vector<std::string> &names)
+bool areIndexed(git_index *index, const std::vector<std::string> &names)
 {
-    const OwnedHandle<git_index> index = getRepositoryIndex(repository);
     return std::all_of(names.begin(), names.end(),
-                       [&index](const std::string &name)
-                       { return git_index_get_bypath(index.get(), name.c_str(), 0) != nullptr; });
+                       [index](const std::string &name)
+                       { return git_index_get_bypath(index, name.c_str(), 0) != nullptr; });
 }
 
 void resetEntries(git_repository *repository, const git_object *head, const PathspecArray &pathspec,
                   const std::vector<std::string> &names)
 {
+    // The one that the resets and the checkout work on. Left to them, it would be empty where
+    // libgit2 can't look at the file, and hold nothing but these entries afterwards.
+    const OwnedHandle<git_index> index = getRepositoryIndex(repository);
     makeResult(git_reset_default(repository, head, getArrayPointer(pathspec))).value();
     // A file whose kind was changed in the index, to a link or from one, is taken out of it by the
     // first reset, and put back by the second.
-    if (head != nullptr && !names.empty() && !areIndexed(repository, names))
+    if (head != nullptr && !areIndexed(index.get(), names))
     {
         makeResult(git_reset_default(repository, head, getArrayPointer(pathspec))).value();
     }

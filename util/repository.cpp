@@ -65,6 +65,13 @@ OwnedHandle<git_index> getRepositoryIndex(git_repository *repository)
     return index;
 }
 
+OwnedHandle<git_index> openIndex(const char *path)
+{
+    OwnedHandle<git_index> index = acquire<git_index>(git_index_open, path).value();
+    readAgainIfEmpty(index.get());
+    return index;
+}
+
 void writeIndex(git_index *index)
 {
     makeResult(git_index_write(index)).value();

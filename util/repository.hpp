@@ -25,6 +25,10 @@ OwnedHandle<git_repository> openRepository(const upath &root);
 /// git_repository_index, and for an empty index git_index_read, to be sure. Raises.
 OwnedHandle<git_index> getRepositoryIndex(git_repository *repository);
 
+/// git_index_open, and for an empty index git_index_read, to be sure: what this file holds,
+/// whatever the repository's index has come to in memory. Raises.
+OwnedHandle<git_index> openIndex(const char *path);
+
 /// git_index_write. Raises; the index on disk is as it was then.
 void writeIndex(git_index *index);
 

@@ -3,6 +3,8 @@
 
 #include <cerrno>
 #include <cstdarg>
+#include <cstring>
+#include <utility>
 
 #include <dlfcn.h>
 #include <fcntl.h>
@@ -16,16 +18,35 @@ namespace
 bool isCounting = false;
 int callsMade = 0;
 int failingCall = 0;
+int secondFailingCall = 0;
 int failingError = 0;
 const char *failedFunction = nullptr;
+/// The file whose looks count, and nothing else; null when every call counts.
+const char *lookedAt = nullptr;
 
-bool fails(const char *function) noexcept
+bool countAndFail(const char *function) noexcept
 {
-    if (!isCounting || ++callsMade != failingCall)
+    ++callsMade;
+    if (callsMade != failingCall && callsMade != secondFailingCall)
         return false;
     failedFunction = function;
     errno = failingError;
     return true;
+}
+
+bool fails(const char *function) noexcept
+{
+    return isCounting && lookedAt == nullptr && countAndFail(function);
+}
+
+bool isLookAt(const char *path) noexcept
+{
+    return isCounting && lookedAt != nullptr && std::strcmp(path, lookedAt) == 0;
+}
+
+bool lookFails(const char *function, const char *path) noexcept
+{
+    return isLookAt(path) ? countAndFail(function) : fails(function);
 }
 
 /// The C library's own function, or a sanitizer's in its place.
@@ -49,10 +70,17 @@ FailingFiles::FailingFiles() : FailingFiles(0, 0)
 {
 }
 
-FailingFiles::FailingFiles(int call, int error)
+FailingFiles::FailingFiles(int call, int error) : FailingFiles(std::string(), call, call, error)
 {
+}
+
+FailingFiles::FailingFiles(std::string file, int first, int second, int error)
+    : file_(std::move(file))
+{
+    lookedAt = file_.empty() ? nullptr : file_.c_str();
     callsMade = 0;
-    failingCall = call;
+    failingCall = first;
+    secondFailingCall = second;
     failingError = error;
     failedFunction = nullptr;
     isCounting = true;
@@ -157,13 +185,19 @@ extern "C"
     int stat(const char *path, struct stat *status) noexcept
     {
         static auto *const real = findReal<int(const char *, struct stat *)>("stat");
-        return fails("stat") ? -1 : real(path, status);
+        return lookFails("stat", path) ? -1 : real(path, status);
     }
 
     int lstat(const char *path, struct stat *status) noexcept
     {
         static auto *const real = findReal<int(const char *, struct stat *)>("lstat");
-        return fails("lstat") ? -1 : real(path, status);
+        return lookFails("lstat", path) ? -1 : real(path, status);
+    }
+
+    int access(const char *path, int mode) noexcept
+    {
+        static auto *const real = findReal<int(const char *, int)>("access");
+        return isLookAt(path) && countAndFail("access") ? -1 : real(path, mode);
     }
 
     int fstat(int descriptor, struct stat *status) noexcept

@@ -18,6 +18,9 @@ class FailingFiles
     /// @param call 1 for the first
     /// @param error the errno
     FailingFiles(int call, int error);
+    /// Counts the looks at one file and nothing else: stat, lstat and access of this path.
+    /// Two fail, or one where the numbers are the same.
+    FailingFiles(std::string file, int first, int second, int error);
     FailingFiles(const FailingFiles &) = delete;
     FailingFiles &operator=(const FailingFiles &) = delete;
     ~FailingFiles();
@@ -26,6 +29,9 @@ class FailingFiles
     int calls() const noexcept;
     /// The function that failed; empty when none did.
     std::string failed() const;
+
+  private:
+    std::string file_;
 };
 
 } // namespace vclink::test

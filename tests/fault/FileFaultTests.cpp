@@ -7,9 +7,11 @@
 #include <iterator>
 #include <map>
 #include <random>
+#include <sstream>
 #include <string>
 #include <vector>
 
+#include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include "../differential/expectedStates.hpp"
@@ -176,6 +178,57 @@ TEST_P(CommitOverFailingCall, FailsOrHoldsEveryFile)
             << after;
     }
 }
+
+/// libgit2 takes an index that it can't look at for an empty one.
+class FailingLookAtTheIndex : public FailingFileCall
+{
+  protected:
+    /// Lets each look fail, and the one that comes so many looks later.
+    void failLooks(int later)
+    {
+        std::string function = "the first";
+        for (int look = 1; !function.empty(); ++look)
+        {
+            const auto action = trial_.begin();
+            std::string outcome;
+            {
+                const FailingFiles failing(index_, look, look + later, EIO);
+                outcome = outcomeOf(action);
+                function = failing.failed();
+            }
+            SCOPED_TRACE("look " + std::to_string(look) + " and " + std::to_string(look + later) +
+                         ", " + function + ": " + outcome);
+            EXPECT_THAT(indexed(), testing::IsSupersetOf(kept_));
+        }
+    }
+    std::vector<std::string> indexed() const
+    {
+        std::vector<std::string> names;
+        std::istringstream lines(trial_.repository().git({"ls-files"}));
+        for (std::string name; std::getline(lines, name);)
+            names.push_back(name);
+        return names;
+    }
+
+    const std::string index_ = trial_.repository().path() / ".git/index";
+    /// What the operation finds in the index and leaves there.
+    std::vector<std::string> kept_;
+};
+
+TEST_P(FailingLookAtTheIndex, LosesNoEntry)
+{
+    const auto after = indexed();
+    trial_.begin();
+    const auto before = indexed();
+    std::set_intersection(before.begin(), before.end(), after.begin(), after.end(),
+                          std::back_inserter(kept_));
+    failLooks(0);
+    // So that reading the index once more fails as the first time did.
+    failLooks(3);
+}
+
+INSTANTIATE_TEST_SUITE_P(Of, FailingLookAtTheIndex, testing::ValuesIn(writingOperations()),
+                         vclink::test::nameOfTest);
 
 std::vector<Operation> ordinaryCommit()
 {

@@ -37,10 +37,10 @@ Names operator+(Names left, const Names &right)
 
 const Names ofTheQuery{"git_status_options_init", "git_repository_open_ext",
                        "git_status_foreach_ext", "git_repository_free"};
-const Names toTheReset =
-    ofTheQuery + Names{"git_repository_open_ext", "git_revparse_single", "git_reset_default"};
-/// A look into the repository's index.
-const Names look{"git_repository_index", "git_index_free"};
+/// The index is read before, to be sure of it.
+const Names reset =
+    ofTheQuery + Names{"git_repository_open_ext", "git_revparse_single", "git_repository_index",
+                       "git_reset_default", "git_index_free"};
 const Names makingOptions{"makeCheckoutOptions", "git_checkout_options_init"};
 const Names checkout{"git_checkout_index"};
 const Names released{"git_object_free", "git_repository_free"};
@@ -95,14 +95,14 @@ class RevertCalls : public vclink::test::StagingTest
 TEST_F(RevertCalls, ResetTheIndexAndCheckItOut)
 {
     revert({"file"});
-    EXPECT_EQ(calls_.names, toTheReset + look + makingOptions + checkout + released);
+    EXPECT_EQ(calls_.names, reset + makingOptions + checkout + released);
     EXPECT_THAT(calls_.handles, IsEmpty());
 }
 
-TEST_F(RevertCalls, LookForNothingElseWithoutAChange)
+TEST_F(RevertCalls, AreTheSameWithoutAChange)
 {
     revert({"other"});
-    EXPECT_EQ(calls_.names, toTheReset + makingOptions + checkout + released);
+    EXPECT_EQ(calls_.names, reset + makingOptions + checkout + released);
 }
 
 TEST_F(RevertCalls, ResetOnceWhereFilesWereOnlyAdded)
@@ -299,14 +299,14 @@ TEST_F(FailingRevertCalls, OfTheOpeningChangeNothing)
 TEST_F(FailingRevertCalls, OfTheResetChangeNothing)
 {
     const NothingChanges nothing(repository_);
-    expectFails("git_reset_default", toTheReset + released);
+    expectFails("git_reset_default", reset + released);
 }
 
 TEST_F(FailingRevertCalls, AfterTheResetLeaveItInPlace)
 {
     repository_.add({"file"});
     const auto expected = stateAfterGit({{"restore", "--staged", "."}});
-    expectFails("git_checkout_options_init", toTheReset + look + makingOptions + released);
+    expectFails("git_checkout_options_init", reset + makingOptions + released);
     EXPECT_EQ(stateOf(repository_), expected);
 }
 
@@ -314,7 +314,7 @@ TEST_F(FailingRevertCalls, OfTheCheckoutLeaveTheResetInPlace)
 {
     repository_.add({"file"});
     const auto expected = stateAfterGit({{"restore", "--staged", "."}});
-    expectFails("git_checkout_index", toTheReset + look + makingOptions + checkout + released);
+    expectFails("git_checkout_index", reset + makingOptions + checkout + released);
     EXPECT_EQ(stateOf(repository_), expected);
 }
 
