@@ -3,6 +3,7 @@
 # sees, and the tests link the objects themselves and so reach what is hidden.
 add_library(vclink_git_objects OBJECT)
 vclink_configure_target(vclink_git_objects)
+vclink_measure(vclink_git_objects)
 target_include_directories(vclink_git_objects PUBLIC
     ${PROJECT_SOURCE_DIR} ${PROJECT_SOURCE_DIR}/include)
 target_link_libraries(vclink_git_objects

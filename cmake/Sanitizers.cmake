@@ -1,5 +1,5 @@
 # SPDX-License-Identifier: MIT
-# vclink_instrumentation: sanitizers and coverage, as the presets choose them. Never exported.
+# vclink_instrumentation: sanitizers, and what measures, as the presets choose them. Never exported.
 add_library(vclink_instrumentation INTERFACE)
 if(VCLINK_SANITIZE)
     list(JOIN VCLINK_SANITIZE "," sanitizers)
@@ -7,7 +7,14 @@ if(VCLINK_SANITIZE)
         -fsanitize=${sanitizers} -fno-sanitize-recover=all -fno-omit-frame-pointer)
     target_link_options(vclink_instrumentation INTERFACE -fsanitize=${sanitizers})
 endif()
+
+# What measures the tests instruments the library's objects, and nothing else.
 if(VCLINK_COVERAGE)
-    target_compile_options(vclink_instrumentation INTERFACE --coverage -fprofile-abs-path)
     target_link_options(vclink_instrumentation INTERFACE --coverage)
 endif()
+
+function(vclink_measure target)
+    if(VCLINK_COVERAGE)
+        target_compile_options(${target} PRIVATE --coverage -fprofile-abs-path)
+    endif()
+endfunction()

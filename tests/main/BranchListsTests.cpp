@@ -195,6 +195,14 @@ TEST(BranchPointerValue, HoldsItsNameAsGiven)
     EXPECT_TRUE((std::is_same_v<decltype(branch.getName()), std::string>)) << "a copy";
 }
 
+TEST(BranchPointerValue, LeavesTheCallersNameAlone)
+{
+    const std::string name = "topic/of-more-than-a-few-characters";
+    const BranchPointer branch(name);
+    EXPECT_EQ(branch.getName(), name);
+    EXPECT_EQ(name, "topic/of-more-than-a-few-characters");
+}
+
 TEST(BranchPointerValue, ComparesNamesExactly)
 {
     const BranchPointer branch("main");
