@@ -132,6 +132,7 @@ static void merge(const char *root, const char *name)
 static void measure(const char *operation, const char *root, const char *name)
 {
     size_t count = 0;
+    registerFloorDriver();
     beginRegion();
     if (strcmp(operation, "branches") == 0)
     {
@@ -179,24 +180,7 @@ static void loadLibrary(void)
 
 int main(int argc, char **argv)
 {
-    const int isChild = argc > 1 && strcmp(argv[1], "child") == 0;
-    char **const arguments = argv + isChild;
-    if (argc - isChild != 4)
-    {
-        fputs("usage: branch_floor [child] branches|switch|merge|driver ROOT NAME\n", stderr);
-        return 2;
-    }
     loadLibrary();
-    git_libgit2_init();
-    registerFloorDriver();
-    if (isChild)
-    {
-        measureChild(arguments[1], arguments[2], arguments[3]);
-    }
-    else
-    {
-        measure(arguments[1], arguments[2], arguments[3]);
-    }
-    git_libgit2_shutdown();
-    return 0;
+    return runFloor(argc, argv, "branch_floor [child] branches|switch|merge|driver ROOT NAME",
+                    measure, measureChild);
 }

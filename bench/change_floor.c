@@ -64,8 +64,9 @@ static void revert(const char *root, git_strarray names)
     git_repository_free(repository);
 }
 
-static void measure(const char *operation, const char *root, git_strarray names)
+static void measure(const char *operation, const char *root, const char *listFile)
 {
+    const git_strarray names = readNames(listFile);
     beginRegion();
     if (strcmp(operation, "add") == 0)
     {
@@ -104,22 +105,6 @@ static void measureChild(const char *operation, const char *root, const char *li
 
 int main(int argc, char **argv)
 {
-    const int isChild = argc > 1 && strcmp(argv[1], "child") == 0;
-    char **const arguments = argv + isChild;
-    if (argc - isChild != 4)
-    {
-        fputs("usage: change_floor [child] add|commit|revert ROOT LIST\n", stderr);
-        return 2;
-    }
-    git_libgit2_init();
-    if (isChild)
-    {
-        measureChild(arguments[1], arguments[2], arguments[3]);
-    }
-    else
-    {
-        measure(arguments[1], arguments[2], readNames(arguments[3]));
-    }
-    git_libgit2_shutdown();
-    return 0;
+    return runFloor(argc, argv, "change_floor [child] add|commit|revert ROOT LIST", measure,
+                    measureChild);
 }

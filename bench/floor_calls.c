@@ -145,6 +145,21 @@ void countCheckout(git_checkout_options *options, size_t *calls)
     options->notify_payload = options->progress_payload = options->perfdata_payload = calls;
 }
 
+int runFloor(int argc, char **argv, const char *usage, Measurement *floor, Measurement *child)
+{
+    const int isChild = argc > 1 && strcmp(argv[1], "child") == 0;
+    char **const arguments = argv + isChild;
+    if (argc - isChild != 4)
+    {
+        fprintf(stderr, "usage: %s\n", usage);
+        return 2;
+    }
+    git_libgit2_init();
+    (isChild ? child : floor)(arguments[1], arguments[2], arguments[3]);
+    git_libgit2_shutdown();
+    return 0;
+}
+
 void measureShell(const char *command)
 {
     size_t bytes = 0;

@@ -28,5 +28,13 @@ void commitIndex(git_repository *repository, size_t parentCount, const git_commi
 /// Wires callbacks into a checkout that count their calls.
 void countCheckout(git_checkout_options *options, size_t *calls);
 
+/// Measures an operation in a working copy; what `argument` is, each program says in its usage.
+typedef void Measurement(const char *operation, const char *root, const char *argument);
+
+/// What a program does with the line "[child] OPERATION ROOT ARGUMENT": measures by `floor`, or, of
+/// a child process, by `child`, while libgit2 is alive.
+/// @return the program's status
+int runFloor(int argc, char **argv, const char *usage, Measurement *floor, Measurement *child);
+
 /// Measures what a host without a library would do: a child process, its output read to the end.
 void measureShell(const char *command);

@@ -190,22 +190,6 @@ static void measureChild(const char *operation, const char *root, const char *ur
 
 int main(int argc, char **argv)
 {
-    const int isChild = argc > 1 && strcmp(argv[1], "child") == 0;
-    char **const arguments = argv + isChild;
-    if (argc - isChild != 4)
-    {
-        fputs("usage: remote_floor [child] clone|fetch|push|heads ROOT URL\n", stderr);
-        return 2;
-    }
-    git_libgit2_init();
-    if (isChild)
-    {
-        measureChild(arguments[1], arguments[2], arguments[3]);
-    }
-    else
-    {
-        measure(arguments[1], arguments[2], arguments[3]);
-    }
-    git_libgit2_shutdown();
-    return 0;
+    return runFloor(argc, argv, "remote_floor [child] clone|fetch|push|heads ROOT URL", measure,
+                    measureChild);
 }
