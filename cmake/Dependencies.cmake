@@ -5,10 +5,10 @@ find_package(PkgConfig REQUIRED)
 pkg_check_modules(libgit2 REQUIRED IMPORTED_TARGET libgit2>=1.0)
 
 set(Boost_USE_STATIC_LIBS OFF)
-find_package(Boost 1.74 REQUIRED COMPONENTS filesystem log thread)
+find_package(Boost 1.74 REQUIRED CONFIG COMPONENTS filesystem log thread)
 
 if(VCLINK_HOST STREQUAL "source")
-    find_package(Boost 1.74 REQUIRED COMPONENTS iostreams locale stacktrace_basic)
+    find_package(Boost 1.74 REQUIRED CONFIG COMPONENTS iostreams locale stacktrace_basic)
     find_package(Gettext REQUIRED)
 elseif(VCLINK_HOST STREQUAL "package")
     find_package(vclink_host REQUIRED)

@@ -3,12 +3,12 @@
 
 #include <fcntl.h>
 #include <git2/diff.h>
-#include <git2/errors.h>
 #include <git2/object.h>
 #include <git2/oid.h>
 #include <sys/stat.h>
 
 #include "error/errorUtil/callbackException.hpp"
+#include "error/errorUtil/setGitError.hpp"
 #include "util/repository.hpp"
 
 namespace vclink::git

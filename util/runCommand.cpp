@@ -6,13 +6,25 @@
 #include <sstream>
 #include <system_error>
 
+#include <fcntl.h>
+#include <unistd.h>
+
+// From Boost 1.86 on version 1 of Boost.Process stands in a folder of its own, and from 1.88 on
+// boost::process means version 2 unless told otherwise.
+#if __has_include(<boost/process/v1/child.hpp>)
+#define BOOST_PROCESS_VERSION 1
+#include <boost/process/v1/child.hpp>
+#include <boost/process/v1/env.hpp>
+#include <boost/process/v1/exception.hpp>
+#include <boost/process/v1/io.hpp>
+#include <boost/process/v1/pipe.hpp>
+#else
 #include <boost/process/child.hpp>
 #include <boost/process/env.hpp>
 #include <boost/process/exception.hpp>
 #include <boost/process/io.hpp>
 #include <boost/process/pipe.hpp>
-#include <fcntl.h>
-#include <unistd.h>
+#endif
 
 #include "error/logging/logger.hpp"
 #include "util/ChildStatus.hpp"

@@ -2,7 +2,8 @@
 #pragma once
 
 #include <boost/outcome/bad_access.hpp>
-#include <boost/outcome/policy/base.hpp>
+// Brings boost/outcome/policy/base.hpp, which does not compile alone from Boost 1.76 on.
+#include <boost/outcome/basic_result.hpp>
 
 #include "vclink/git/GitError.hpp"
 

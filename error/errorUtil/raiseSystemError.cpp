@@ -3,8 +3,7 @@
 
 #include <system_error>
 
-#include <git2/errors.h>
-
+#include "error/errorUtil/setGitError.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
 
 namespace vclink::git

@@ -13,6 +13,7 @@
 
 #include "error/HermeticLibGit2.hpp"
 #include "error/errorUtil/callbackException.hpp"
+#include "error/errorUtil/setGitError.hpp"
 #include "error/logging/severity.hpp"
 #include "support/LogCapture.hpp"
 #include "vclink/git/LibGit2Exception.hpp"

@@ -6,10 +6,10 @@
 #include <typeinfo>
 
 #include <boost/variant/get.hpp>
-#include <git2/errors.h>
 #include <gtest/gtest.h>
 
 #include "error/HermeticLibGit2.hpp"
+#include "error/errorUtil/setGitError.hpp"
 #include "fl/i18n/convert.hpp"
 #include "vclink/git/messageIdentifiers.hpp"
 

@@ -11,6 +11,7 @@
 
 #include "error/HermeticLibGit2.hpp"
 #include "error/errorUtil/GitResult.hpp"
+#include "error/errorUtil/setGitError.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
 
 namespace vclink::git

@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: MIT
 #include "LibGit2Faults.hpp"
+#include "error/errorUtil/setGitError.hpp"
 
 #include <string_view>
 

@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: MIT
 #include "BranchCalls.hpp"
+#include "error/errorUtil/setGitError.hpp"
 
 #include <cstring>
 #include <stdexcept>

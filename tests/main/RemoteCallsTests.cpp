@@ -12,6 +12,7 @@
 #include "LibGit2Calls.hpp"
 #include "RemoteTest.hpp"
 #include "TestOptionsFactory.hpp"
+#include "error/errorUtil/setGitError.hpp"
 #include "error/logging/severity.hpp"
 #include "support/LogCapture.hpp"
 #include "support/text.hpp"

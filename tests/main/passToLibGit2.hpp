@@ -7,6 +7,7 @@
 #include <dlfcn.h>
 
 #include "LibGit2Calls.hpp"
+#include "error/errorUtil/setGitError.hpp"
 
 /// What the definitions that stand in libgit2's place are made of.
 namespace vclink::test::detail

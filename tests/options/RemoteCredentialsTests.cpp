@@ -10,6 +10,7 @@
 
 #include "error/HermeticLibGit2.hpp"
 #include "error/errorUtil/callbackException.hpp"
+#include "error/errorUtil/setGitError.hpp"
 #include "error/logging/severity.hpp"
 #include "options/gitRecords.hpp"
 #include "support/LogCapture.hpp"

@@ -15,6 +15,7 @@
 #include "error/CoreFilter.hpp"
 #include "error/HermeticLibGit2.hpp"
 #include "error/errorUtil/callbackException.hpp"
+#include "error/errorUtil/setGitError.hpp"
 #include "error/logging/severity.hpp"
 #include "options/gitRecords.hpp"
 #include "support/LogCapture.hpp"

@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: MIT
+#include "error/errorUtil/setGitError.hpp"
 #include "options/gitRecords.hpp"
 
 #include <cstring>

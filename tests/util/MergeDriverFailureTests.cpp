@@ -8,7 +8,6 @@
 #include <string>
 #include <system_error>
 
-#include <boost/process/exception.hpp>
 #include <git2.h>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
@@ -16,6 +15,7 @@
 #include "MergeDriverTest.hpp"
 #include "SignalAction.hpp"
 #include "error/errorUtil/callbackException.hpp"
+#include "util/processError.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
 
 namespace

@@ -9,7 +9,6 @@
 #include <thread>
 #include <vector>
 
-#include <boost/process/exception.hpp>
 #include <fcntl.h>
 #include <gtest/gtest.h>
 #include <sys/resource.h>
@@ -18,6 +17,7 @@
 #include "MergeDriverTest.hpp"
 #include "SignalAction.hpp"
 #include "support/UnprivilegedUser.hpp"
+#include "util/processError.hpp"
 
 namespace
 {

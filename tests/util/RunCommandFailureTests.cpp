@@ -8,7 +8,6 @@
 #include <stdexcept>
 #include <string>
 
-#include <boost/process/exception.hpp>
 #include <fcntl.h>
 #include <gtest/gtest.h>
 #include <sys/wait.h>
@@ -17,6 +16,7 @@
 #include "DescriptorLimit.hpp"
 #include "RunCommandTest.hpp"
 #include "support/LogCapture.hpp"
+#include "util/processError.hpp"
 #include "util/runCommand.hpp"
 
 namespace

@@ -12,7 +12,6 @@
 #include <thread>
 #include <vector>
 
-#include <boost/process/exception.hpp>
 #include <fcntl.h>
 #include <gtest/gtest.h>
 #include <sys/resource.h>
@@ -23,6 +22,7 @@
 #include "SignalAction.hpp"
 #include "support/Command.hpp"
 #include "support/LogCapture.hpp"
+#include "util/processError.hpp"
 #include "util/runCommand.hpp"
 
 namespace

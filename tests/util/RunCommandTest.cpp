@@ -1,10 +1,10 @@
 // SPDX-License-Identifier: MIT
 #include "RunCommandTest.hpp"
 
-#include <boost/process/exception.hpp>
 #include <gtest/gtest.h>
 
 #include "support/LogCapture.hpp"
+#include "util/processError.hpp"
 #include "util/runCommand.hpp"
 
 namespace vclink::test

@@ -1,0 +1,10 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+// boost::process::process_error, wherever the release of Boost has it (see util/runCommand.cpp).
+#if __has_include(<boost/process/v1/exception.hpp>)
+#define BOOST_PROCESS_VERSION 1
+#include <boost/process/v1/exception.hpp>
+#else
+#include <boost/process/exception.hpp>
+#endif
