@@ -1,0 +1,157 @@
+// SPDX-License-Identifier: MIT
+#include <string>
+#include <utility>
+#include <vector>
+
+#include <gtest/gtest.h>
+#include <sys/stat.h>
+
+#include "DiskTest.hpp"
+
+namespace
+{
+
+namespace fs = std::filesystem;
+using vclink::test::Action;
+
+/// Takes permissions from a file, or from a folder and all folders in it, as long as it lives.
+class Withheld
+{
+  public:
+    Withheld(const fs::path &path, mode_t mode)
+    {
+        // Before the folders can't be entered any more.
+        std::vector<fs::path> places{path};
+        if (fs::is_directory(path))
+        {
+            for (const auto &entry : fs::recursive_directory_iterator(path))
+            {
+                if (!entry.is_symlink() && entry.is_directory())
+                    places.push_back(entry.path());
+            }
+        }
+        for (const auto &place : places)
+            set(place, mode);
+    }
+    Withheld(const Withheld &) = delete;
+    Withheld &operator=(const Withheld &) = delete;
+    ~Withheld()
+    {
+        for (const auto &[path, mode] : saved_)
+        {
+            if (fs::exists(path))
+                ::chmod(path.c_str(), mode);
+        }
+    }
+
+  private:
+    void set(const fs::path &path, mode_t mode)
+    {
+        struct stat status = {};
+        ::stat(path.c_str(), &status);
+        saved_.emplace_back(path, status.st_mode);
+        ::chmod(path.c_str(), mode);
+    }
+
+    std::vector<std::pair<fs::path, mode_t>> saved_;
+};
+
+struct Lack
+{
+    fs::path path;
+    mode_t mode;
+};
+
+bool begins(const std::string &text, const std::string &beginning)
+{
+    return text.compare(0, beginning.size(), beginning) == 0;
+}
+
+std::string replaced(std::string text, const std::string &from, const std::string &to)
+{
+    for (auto at = text.find(from); at != std::string::npos; at = text.find(from, at + to.size()))
+        text.replace(at, from.size(), to);
+    return text;
+}
+
+class WithoutPermission : public vclink::test::DiskTest
+{
+  protected:
+    std::vector<Lack> lacks() const
+    {
+        const fs::path root = trial().repository().path();
+        const std::string &name = GetParam().name;
+        if (begins(name, "write"))
+            return {{environment().home(), 0555}, {environment().home() / ".gitconfig", 0000}};
+        std::vector<Lack> all{
+            {root, 0555},
+            {root / ".git/objects", 0555},
+            {root / ".git/refs", 0555},
+            {root / ".git/refs", 0000},
+            {root / ".git/index", 0000},
+            {root / ".git/HEAD", 0000},
+            {root / ".git/config", 0000},
+        };
+        if (fs::is_regular_file(fs::symlink_status(root / "file")))
+            all.push_back({root / "file", 0000});
+        if (fs::exists(root.parent_path() / "origin"))
+            all.push_back({root.parent_path() / "origin", 0555});
+        if (name == "mergeByTool")
+            all.push_back({environment().temporary(), 0555});
+        return all;
+    }
+
+    /// What an operation may leave that ends as if all was well.
+    std::vector<std::string> otherGists(const fs::path &path) const
+    {
+        // A status walk that fails finds no files.
+        if (GetParam().name == "addFiles")
+            return {gistBefore()};
+        // As a configuration that is not there: the identity comes from the environment.
+        if (path.filename() == "config")
+            return {replaced(trial().normalGist(), "Test Person", "builder")};
+        // libgit2 leaves a file alone that it can't read.
+        if (GetParam().name == "revertFiles" && path.filename() == "file")
+            return {statusOfFile() + trial().normalGist()};
+        return {};
+    }
+    /// Without a HEAD that can be read a revert takes the files out of the index, which is meant,
+    /// and then fails; the next one puts them back.
+    std::vector<std::string> losses(const Lack &lack) const
+    {
+        const bool isHeadless =
+            lack.mode == 0000 && (lack.path.filename() == "HEAD" || lack.path.filename() == "refs");
+        if (begins(GetParam().name, "revertFiles") && isHeadless)
+            return {"entry file", "entry other"};
+        return {};
+    }
+    std::string statusOfFile() const
+    {
+        const auto begin = gistBefore().find("1 .M ");
+        return gistBefore().substr(begin, gistBefore().find('\n', begin) + 1 - begin);
+    }
+};
+
+TEST_P(WithoutPermission, FailsWithATypeAndLosesNothing)
+{
+    prepare(folder() / "trial");
+    trial().begin();
+    for (const Lack &lack : lacks())
+    {
+        SCOPED_TRACE(lack.path);
+        tryOnce(
+            [&](const Action &action)
+            {
+                const Withheld withheld(lack.path, lack.mode);
+                return runInChild(action);
+            },
+            otherGists(lack.path), losses(lack));
+    }
+    EXPECT_GT(failures(), 0);
+}
+
+INSTANTIATE_TEST_SUITE_P(Of, WithoutPermission,
+                         testing::ValuesIn(vclink::test::operationsThatWrite()),
+                         vclink::test::nameOfOperation);
+
+} // namespace
