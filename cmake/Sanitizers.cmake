@@ -17,4 +17,9 @@ function(vclink_measure target)
     if(VCLINK_COVERAGE)
         target_compile_options(${target} PRIVATE --coverage -fprofile-abs-path)
     endif()
+    if(VCLINK_RECORD_REACH)
+        # Without warnings: they are errors here, and a mutant is often worth one.
+        target_compile_options(${target} PRIVATE
+            -fsanitize-coverage=inline-8bit-counters,pc-table -gline-tables-only -w)
+    endif()
 endfunction()
