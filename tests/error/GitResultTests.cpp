@@ -5,6 +5,7 @@
 #include <type_traits>
 
 #include <boost/exception/get_error_info.hpp>
+#include <boost/version.hpp>
 #include <git2.h>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
@@ -108,9 +109,12 @@ TEST(GitResult, OfASuccessHoldsADefaultMadeError)
     git_error_set_str(GIT_ERROR_NET, "stale");
     const GitResult<void> result = makeResult(0);
     ASSERT_TRUE(result.has_value());
+    EXPECT_FALSE(result.has_error());
+#if BOOST_VERSION < 107600 // Later releases keep the value and the error in one place.
     EXPECT_EQ(Peek::error(result).getCode(), 0);
     EXPECT_EQ(Peek::error(result).getErrorClass(), 0);
     EXPECT_EQ(Peek::error(result).getMessage(), ustring());
+#endif
 }
 
 TEST(GitResult, OfAFailureRaisesItWhenAskedForItsValue)
