@@ -1,19 +1,12 @@
 // SPDX-License-Identifier: MIT
-#include <algorithm>
+// The calls to libgit2 of lists, switches and other operations on branches.
 #include <functional>
 #include <string>
-#include <vector>
 
-#include <fcntl.h>
-#include <git2.h>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "BranchCalls.hpp"
-#include "MergeTest.hpp"
-#include "error/logging/severity.hpp"
-#include "support/LogCapture.hpp"
-#include "vclink/git/messageIdentifiers.hpp"
+#include "BranchCallsTest.hpp"
 
 namespace
 {
@@ -23,96 +16,29 @@ using testing::ElementsAre;
 using testing::IsEmpty;
 using testing::SizeIs;
 using vclink::test::BranchCalls;
-using vclink::test::LibGit2Failure;
 using vclink::test::libGit2FailureOf;
-using vclink::test::LogCapture;
 using vclink::test::NothingChanges;
 using vclink::test::stateOf;
-using vclink::test::textOf;
-using Calls = std::vector<std::string>;
 
-const LibGit2Failure injected{GIT_ERROR, GIT_ERROR_OS, "injected"};
-
-/// The calls to libgit2, and what becomes of a failure of each.
-class BranchCallsTest : public vclink::test::MergeTest
+class CallsOnBranches : public vclink::test::BranchCallsTest
 {
   protected:
-    void makeAhead()
-    {
-        makeBranch("topic", [this] { repository_.write("new", "x"); });
-    }
-    void makeDiverged()
-    {
-        diverge([this] { repository_.write("ours", "x"); },
-                [this] { repository_.write("theirs", "x"); });
-    }
-    void makeConflicts()
-    {
-        repository_.write(".gitattributes", "binary -merge\n");
-        repository_.write("binary", "ancestor\n");
-        repository_.commitAll("attributes");
-        diverge(
-            [this]
-            {
-                repository_.write("file", "ours\n");
-                repository_.write("binary", "ours\n");
-            },
-            [this]
-            {
-                repository_.write("file", "theirs\n");
-                repository_.write("binary", "theirs\n");
-            });
-    }
-    static void expectBalance(const Calls &calls, const char *made, const char *freed)
-    {
-        EXPECT_EQ(std::count(calls.begin(), calls.end(), made),
-                  std::count(calls.begin(), calls.end(), freed))
-            << made;
-    }
     /// Expects that a failure of each call is raised, with the repository released.
-    static void expectEachRaised(const Calls &names, const std::function<void()> &action)
+    void expectEachRaised(const Calls &names, const std::function<void()> &action) const
     {
         for (const auto &name : names)
         {
             BranchCalls calls;
             calls.failing[name] = GIT_ERROR;
-            EXPECT_EQ(libGit2FailureOf(action), injected) << name;
+            EXPECT_EQ(libGit2FailureOf(action), injected_) << name;
             EXPECT_EQ(calls.names.back(),
                       name == "repository_open_ext" ? "repository_open_ext" : "repository_free")
                 << name;
         }
     }
-    /// The same of a merge.
-    void expectEachFailsTheMerge(const Calls &names) const
-    {
-        for (const auto &name : names)
-        {
-            BranchCalls calls;
-            calls.failing[name] = GIT_ERROR;
-            EXPECT_EQ(failureOfMerge("topic"), textOf(injected)) << name;
-            if (name != "annotated_commit_lookup")
-                expectBalance(calls.names, "annotated_commit_lookup", "annotated_commit_free");
-        }
-    }
-    void expectCheckoutRecord(const git_checkout_options &record, unsigned strategy) const
-    {
-        EXPECT_EQ(record.version, 1U);
-        EXPECT_EQ(record.checkout_strategy, strategy);
-        EXPECT_EQ(record.notify_flags, 0xFFFFU);
-        EXPECT_NE(record.notify_cb, nullptr);
-        EXPECT_NE(record.progress_cb, nullptr);
-        EXPECT_NE(record.perfdata_cb, nullptr);
-        const void *const callbacks = &adapter_->getCallbacks().checkoutCallbacks();
-        EXPECT_EQ(record.progress_payload, callbacks);
-        EXPECT_EQ(record.perfdata_payload, callbacks);
-        EXPECT_EQ(record.baseline, nullptr);
-        EXPECT_EQ(record.target_directory, nullptr);
-        EXPECT_EQ(record.disable_filters, 0);
-        EXPECT_EQ(record.file_open_flags, O_CREAT | O_TRUNC | O_WRONLY | O_NOFOLLOW);
-    }
 };
 
-TEST_F(BranchCallsTest, OfAListAreTheseInOrder)
+TEST_F(CallsOnBranches, OfAListAreTheseInOrder)
 {
     BranchCalls calls;
     branches().getLocalBranches();
@@ -121,7 +47,7 @@ TEST_F(BranchCallsTest, OfAListAreTheseInOrder)
                                          "branch_iterator_free", "repository_free"));
 }
 
-TEST_F(BranchCallsTest, OfAListAreRaisedWhenTheyFail)
+TEST_F(CallsOnBranches, OfAListAreRaisedWhenTheyFail)
 {
     expectEachRaised({"repository_open_ext", "branch_iterator_new", "branch_next"},
                      [this] { branches().getLocalBranches(); });
@@ -129,14 +55,14 @@ TEST_F(BranchCallsTest, OfAListAreRaisedWhenTheyFail)
                      [this] { branches().getRemoteBranches(); });
 }
 
-TEST_F(BranchCallsTest, OfAListEndIt)
+TEST_F(CallsOnBranches, OfAListEndIt)
 {
     BranchCalls calls;
     calls.failing["branch_next"] = GIT_ITEROVER;
     EXPECT_THAT(branches().getLocalBranches(), IsEmpty());
 }
 
-TEST_F(BranchCallsTest, OfASwitchAreTheseInOrder)
+TEST_F(CallsOnBranches, OfASwitchAreTheseInOrder)
 {
     makeAhead();
     BranchCalls calls;
@@ -146,7 +72,7 @@ TEST_F(BranchCallsTest, OfASwitchAreTheseInOrder)
                                          "reference_free", "repository_free"));
 }
 
-TEST_F(BranchCallsTest, OfASwitchHaveTheRecordOfASafeCheckout)
+TEST_F(CallsOnBranches, OfASwitchHaveTheRecordOfASafeCheckout)
 {
     makeAhead();
     BranchCalls calls;
@@ -156,7 +82,7 @@ TEST_F(BranchCallsTest, OfASwitchHaveTheRecordOfASafeCheckout)
     EXPECT_THAT(calls.checkoutPaths[0], IsEmpty());
 }
 
-TEST_F(BranchCallsTest, OfASwitchAreRaisedWhenTheyFail)
+TEST_F(CallsOnBranches, OfASwitchAreRaisedWhenTheyFail)
 {
     makeAhead();
     const NothingChanges nothing(repository_);
@@ -164,7 +90,7 @@ TEST_F(BranchCallsTest, OfASwitchAreRaisedWhenTheyFail)
                      [this] { branches().switchBranch("topic"); });
 }
 
-TEST_F(BranchCallsTest, OfASwitchLeaveTheHeadWhenItCannotBeSet)
+TEST_F(CallsOnBranches, OfASwitchLeaveTheHeadWhenItCannotBeSet)
 {
     makeAhead();
     const std::string head = stateOf(repository_).head;
@@ -172,7 +98,7 @@ TEST_F(BranchCallsTest, OfASwitchLeaveTheHeadWhenItCannotBeSet)
     EXPECT_EQ(stateOf(repository_).head, head);
 }
 
-TEST_F(BranchCallsTest, OfANewBranchAreTheseInOrder)
+TEST_F(CallsOnBranches, OfANewBranchAreTheseInOrder)
 {
     BranchCalls calls;
     branches().createBranch(git::BranchParameters("new", "main"));
@@ -181,14 +107,14 @@ TEST_F(BranchCallsTest, OfANewBranchAreTheseInOrder)
                                          "object_free", "repository_free"));
 }
 
-TEST_F(BranchCallsTest, OfANewBranchAreRaisedWhenTheyFail)
+TEST_F(CallsOnBranches, OfANewBranchAreRaisedWhenTheyFail)
 {
     const NothingChanges nothing(repository_);
     expectEachRaised({"repository_open_ext", "reference_dwim", "branch_create"},
                      [this] { branches().createBranch(git::BranchParameters("new", "main")); });
 }
 
-TEST_F(BranchCallsTest, OfADeletionAreTheseInOrderAndRaised)
+TEST_F(CallsOnBranches, OfADeletionAreTheseInOrderAndRaised)
 {
     repository_.git({"branch", "old"});
     {
@@ -202,7 +128,7 @@ TEST_F(BranchCallsTest, OfADeletionAreTheseInOrderAndRaised)
                                          "reference_free", "repository_free"));
 }
 
-TEST_F(BranchCallsTest, OfTheCurrentBranchAreTheseInOrderAndRaised)
+TEST_F(CallsOnBranches, OfTheCurrentBranchAreTheseInOrderAndRaised)
 {
     {
         BranchCalls calls;
@@ -212,186 +138,6 @@ TEST_F(BranchCallsTest, OfTheCurrentBranchAreTheseInOrderAndRaised)
     }
     expectEachRaised({"repository_open_ext", "repository_head", "branch_name"},
                      [this] { branches().getCurrentBranch(); });
-}
-
-TEST_F(BranchCallsTest, OfAFastForwardAreTheseInOrder)
-{
-    makeAhead();
-    BranchCalls calls;
-    merge("topic");
-    EXPECT_THAT(calls.names,
-                ElementsAre("repository_open_ext", "repository_state", "revparse_single",
-                            "object_free", "annotated_commit_lookup", "merge_analysis",
-                            "repository_head", "object_lookup", "checkout_tree",
-                            "reference_set_target", "reference_free", "object_free",
-                            "reference_free", "annotated_commit_free", "repository_free"))
-        << "and nothing for the reflog";
-    ASSERT_THAT(calls.checkouts, SizeIs(1));
-    expectCheckoutRecord(calls.checkouts[0], 1);
-    EXPECT_THAT(calls.checkoutPaths[0], IsEmpty());
-}
-
-TEST_F(BranchCallsTest, OfAFastForwardFailTheMergeWhenTheyFail)
-{
-    makeAhead();
-    {
-        const NothingChanges nothing(repository_);
-        expectEachFailsTheMerge({"repository_open_ext", "revparse_single",
-                                 "annotated_commit_lookup", "repository_head", "object_lookup",
-                                 "checkout_tree"});
-    }
-    const std::string main = idOf("main");
-    expectEachFailsTheMerge({"reference_set_target"});
-    EXPECT_EQ(idOf("main"), main);
-}
-
-TEST_F(BranchCallsTest, OfAMergeThatIsUpToDateStopAtTheAnalysis)
-{
-    BranchCalls calls;
-    merge("main");
-    EXPECT_THAT(calls.names,
-                ElementsAre("repository_open_ext", "repository_state", "revparse_single",
-                            "object_free", "annotated_commit_lookup", "merge_analysis",
-                            "annotated_commit_free", "repository_free"));
-}
-
-TEST_F(BranchCallsTest, OfAMergeThatFailsReleaseAllBeforeTheExceptionIsMade)
-{
-    makeDiverged();
-    BranchCalls calls;
-    calls.failing["merge"] = GIT_ERROR;
-    LogCapture log(git::SeverityException);
-    std::string last;
-    log.onRecord([&](const vclink::test::LogRecord &) { last = calls.names.back(); });
-    failureOfMerge("topic");
-    EXPECT_EQ(last, "repository_free");
-}
-
-TEST_F(BranchCallsTest, OfAMergeUnderWayStopAtTheState)
-{
-    BranchCalls calls;
-    calls.failing["repository_state"] = GIT_REPOSITORY_STATE_REBASE;
-    EXPECT_EQ(failureOfMerge("topic"),
-              textOf(shared_vclink::git::UnableToMergeBadRepositoryState()));
-    EXPECT_THAT(calls.names,
-                ElementsAre("repository_open_ext", "repository_state", "repository_free"));
-}
-
-/// No bit is set then, and the merge is a true one.
-TEST_F(BranchCallsTest, OfTheAnalysisMayFail)
-{
-    makeAhead();
-    const std::string head = idOf("HEAD");
-    {
-        BranchCalls calls;
-        calls.failing["merge_analysis"] = GIT_ERROR;
-        const LogCapture log(git::SeverityDiagnostic);
-        merge("topic");
-        EXPECT_THAT(log.messages(),
-                    testing::IsSupersetOf({"Merge Analysis: ", "Merge Preference: "}));
-    }
-    EXPECT_THAT(parents(), ElementsAre(head, idOf("topic")));
-}
-
-/// Those of a merge that has no conflicts, before the commit.
-TEST_F(BranchCallsTest, OfACleanMergeAreTheseInOrder)
-{
-    makeDiverged();
-    BranchCalls calls;
-    merge("topic");
-    ASSERT_GE(calls.names.size(), 12U);
-    const Calls first(calls.names.begin(), calls.names.begin() + 12);
-    EXPECT_THAT(first, ElementsAre("repository_open_ext", "repository_state", "revparse_single",
-                                   "object_free", "annotated_commit_lookup", "merge_analysis",
-                                   "merge", "repository_index", "index_has_conflicts",
-                                   "reference_dwim", "reference_free", "repository_open_ext"));
-    const Calls last(calls.names.end() - 3, calls.names.end());
-    EXPECT_THAT(last, ElementsAre("index_free", "annotated_commit_free", "repository_free"));
-    ASSERT_THAT(calls.checkouts, SizeIs(1));
-    expectCheckoutRecord(calls.checkouts[0], 18);
-    EXPECT_THAT(calls.checkoutPaths[0], IsEmpty());
-    EXPECT_EQ(calls.changedMergeOptions, 0);
-}
-
-TEST_F(BranchCallsTest, OfACleanMergeFailItWhenTheyFail)
-{
-    makeDiverged();
-    const NothingChanges nothing(repository_);
-    expectEachFailsTheMerge(
-        {"repository_open_ext", "revparse_single", "annotated_commit_lookup", "merge"});
-}
-
-TEST_F(BranchCallsTest, OfTheIndexFailTheMergeThatStandsByThen)
-{
-    makeDiverged();
-    const std::string head = idOf("HEAD");
-    expectEachFailsTheMerge({"repository_index"});
-    EXPECT_EQ(idOf("HEAD"), head);
-    EXPECT_EQ(idOf("MERGE_HEAD"), idOf("topic"));
-    EXPECT_EQ(branches().getRepositoryState(), "Conflicts");
-}
-
-TEST_F(BranchCallsTest, OfConflictsAreTheseInOrder)
-{
-    makeConflicts();
-    BranchCalls calls;
-    expectConflicts("topic");
-    const auto begin = std::find(calls.names.begin(), calls.names.end(), "index_has_conflicts");
-    const auto end = std::find(begin, calls.names.end(), "repository_free");
-    EXPECT_EQ(std::count(begin, end, "attr_get"), 12) << "two attributes of three stages twice";
-    Calls others;
-    std::copy_if(begin, end, std::back_inserter(others),
-                 [](const std::string &name) { return name.rfind("attr_", 0) != 0; });
-    EXPECT_THAT(others, ElementsAre("index_has_conflicts", "index_conflict_iterator_new",
-                                    "index_conflict_next", "index_conflict_next",
-                                    "index_conflict_next", "index_conflict_iterator_free",
-                                    "checkout_index", "index_free", "annotated_commit_free"));
-    EXPECT_THAT(calls.attributeFlags, testing::Each(0U));
-}
-
-TEST_F(BranchCallsTest, OfTheSecondCheckoutTakeTheFirstOnesRecordAndOurs)
-{
-    makeConflicts();
-    BranchCalls calls;
-    expectConflicts("topic");
-    ASSERT_THAT(calls.checkouts, SizeIs(2));
-    expectCheckoutRecord(calls.checkouts[0], 18);
-    expectCheckoutRecord(calls.checkouts[1], 18 | 2048);
-    EXPECT_THAT(calls.checkoutPaths[0], IsEmpty());
-    EXPECT_THAT(calls.checkoutPaths[1], ElementsAre("binary", "binary", "binary"))
-        << "once for each stage";
-}
-
-TEST_F(BranchCallsTest, OfTheSecondCheckoutAreToldInPlaceOfTheConflicts)
-{
-    makeConflicts();
-    const std::string head = idOf("HEAD");
-    expectEachFailsTheMerge({"checkout_index"});
-    EXPECT_EQ(idOf("HEAD"), head);
-    EXPECT_EQ(branches().getRepositoryState(), "Conflicts");
-    EXPECT_THAT(repository_.read("binary"), testing::HasSubstr("<<<<<<<"));
-}
-
-TEST_F(BranchCallsTest, OfTheWalkOverConflictsFailTheMerge)
-{
-    makeConflicts();
-    for (const std::string name : {"index_conflict_iterator_new", "index_conflict_next"})
-    {
-        expectEachFailsTheMerge({name});
-        EXPECT_EQ(branches().getRepositoryState(), "Conflicts") << name;
-        repository_.git({"merge", "--abort"});
-    }
-}
-
-TEST_F(BranchCallsTest, OfAttributesMayFailAndCountAsNoAttribute)
-{
-    makeConflicts();
-    BranchCalls calls;
-    calls.failing["attr_get"] = GIT_ERROR;
-    const LogCapture log(git::SeverityDiagnostic);
-    expectConflicts("topic");
-    EXPECT_THAT(calls.checkouts, SizeIs(1));
-    EXPECT_THAT(repository_.read("binary"), testing::HasSubstr("<<<<<<<"));
 }
 
 } // namespace

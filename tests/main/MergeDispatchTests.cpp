@@ -26,19 +26,6 @@ using vclink::test::textOf;
 class MergeDispatch : public vclink::test::MergeTest
 {
   protected:
-    void makeAhead()
-    {
-        makeBranch("topic", [this] { repository_.write("new", "x"); });
-    }
-    void makeDiverged()
-    {
-        diverge([this] { repository_.write("ours", "x"); },
-                [this] { repository_.write("theirs", "x"); });
-    }
-    void prefer(const std::string &value) const
-    {
-        repository_.git({"config", "merge.ff", value});
-    }
     void expectNothingHappens(const std::string &name) const
     {
         const NothingChanges nothing(repository_);

@@ -75,19 +75,6 @@ TEST(MergePreferenceText, IsEmptyForNoBitsAndUnknownOnes)
 class MergeLog : public vclink::test::MergeTest
 {
   protected:
-    void makeAhead()
-    {
-        makeBranch("topic", [this] { repository_.write("new", "x"); });
-    }
-    void makeDiverged()
-    {
-        diverge([this] { repository_.write("ours", "x"); },
-                [this] { repository_.write("theirs", "x"); });
-    }
-    void prefer(const std::string &value) const
-    {
-        repository_.git({"config", "merge.ff", value});
-    }
     /// The diagnostic records of a merge that may fail, without those of drivers and failures.
     std::vector<std::string> decisions(const std::string &name) const
     {

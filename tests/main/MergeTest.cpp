@@ -144,6 +144,22 @@ void MergeTest::diverge(const std::function<void()> &ours, const std::function<v
     repository_.commitAll("on main");
 }
 
+void MergeTest::makeAhead()
+{
+    makeBranch("topic", [this] { repository_.write("new", "x"); });
+}
+
+void MergeTest::makeDiverged()
+{
+    diverge([this] { repository_.write("ours", "x"); },
+            [this] { repository_.write("theirs", "x"); });
+}
+
+void MergeTest::prefer(const std::string &value) const
+{
+    repository_.git({"config", "merge.ff", value});
+}
+
 void MergeTest::crissCross(const std::function<void()> &ours, const std::function<void()> &theirs)
 {
     const std::string first = idOf("main");

@@ -54,6 +54,10 @@ class MergeTest : public BranchTest
     std::function<void()> moving(const std::string &from, const std::string &to) const;
     /// Has `ours` committed on main and `theirs` on the new branch "topic".
     void diverge(const std::function<void()> &ours, const std::function<void()> &theirs);
+    /// Makes the branch "topic" with a commit that main does not have, of the file "new".
+    void makeAhead();
+    /// diverge() with a new file on either side, "ours" and "theirs".
+    void makeDiverged();
     /// After diverge(): has each branch merge what the other has so far, so that there are two
     /// merge bases, and commit one more change.
     void crissCross(const std::function<void()> &ours, const std::function<void()> &theirs);
@@ -62,6 +66,8 @@ class MergeTest : public BranchTest
     GitRepository addModule();
     /// A copy of the working copy as it is now, in the test's folder.
     GitRepository makeTwin() const;
+    /// Sets `merge.ff`.
+    void prefer(const std::string &value) const;
     /// What `git merge` makes of a twin.
     MergeOutcome outcomeByGit(const std::string &name) const;
     /// What the library makes of the working copy; conflicts are no failure.
