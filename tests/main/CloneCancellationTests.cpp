@@ -11,6 +11,7 @@
 #include "error/logging/severity.hpp"
 #include "support/Descriptors.hpp"
 #include "support/LogCapture.hpp"
+#include "support/cancelAt.hpp"
 
 namespace
 {
@@ -19,23 +20,13 @@ namespace git = vclink::git;
 using testing::Contains;
 using testing::Not;
 using testing::StartsWith;
+using vclink::test::cancelAt;
 using vclink::test::expectCancelled;
 using vclink::test::LogCapture;
-using vclink::test::LogRecord;
 
 class CloneCancellation : public vclink::test::CloneTest
 {
   protected:
-    /// Asks for cancellation at the record with this number, of those that begin like this.
-    void cancelAt(LogCapture &log, const std::string &beginning, int number = 1)
-    {
-        log.onRecord(
-            [this, beginning, number](const LogRecord &record) mutable
-            {
-                if (record.message.compare(0, beginning.size(), beginning) == 0 && --number == 0)
-                    interactor_->cancel();
-            });
-    }
     bool isThere() const
     {
         return std::filesystem::exists(clone_.path());
@@ -61,7 +52,7 @@ TEST_F(CloneCancellation, AskedForBeforeStopsTheCheckoutWhereNothingIsTransferre
 TEST_F(CloneCancellation, DuringTheTransferRemovesTheFolder)
 {
     LogCapture log(git::SeverityProgress);
-    cancelAt(log, "Transfer Progress");
+    cancelAt(log, *interactor_, "Transfer Progress");
     expectCancelled([this] { generate(); });
     EXPECT_THAT(log.messages(), Not(Contains(StartsWith("Checkout"))));
     EXPECT_FALSE(isThere());
@@ -71,7 +62,7 @@ TEST_F(CloneCancellation, DuringTheTransferEmptiesAFolderThatWasThere)
 {
     std::filesystem::create_directory(clone_.path());
     LogCapture log(git::SeverityProgress);
-    cancelAt(log, "Transfer Progress");
+    cancelAt(log, *interactor_, "Transfer Progress");
     expectCancelled([this] { generate(); });
     ASSERT_TRUE(isThere());
     EXPECT_TRUE(std::filesystem::is_empty(clone_.path()));
@@ -80,7 +71,7 @@ TEST_F(CloneCancellation, DuringTheTransferEmptiesAFolderThatWasThere)
 TEST_F(CloneCancellation, DuringTheCheckoutStopsAtTheNextFile)
 {
     LogCapture log(git::SeverityProgress);
-    cancelAt(log, "Checkout Notify", 2);
+    cancelAt(log, *interactor_, "Checkout Notify", 2);
     expectCancelled([this] { generate(); });
     const auto messages = log.messages();
     EXPECT_EQ(std::count_if(messages.begin(), messages.end(),
@@ -94,7 +85,7 @@ TEST_F(CloneCancellation, DuringTheCheckoutStopsAtTheNextFile)
 TEST_F(CloneCancellation, DuringTheTransferStopsTheNextCloneAtItsFirstFile)
 {
     LogCapture log(git::SeverityProgress);
-    cancelAt(log, "Transfer Progress");
+    cancelAt(log, *interactor_, "Transfer Progress");
     expectCancelled([this] { generate(); });
     log.onRecord(nullptr);
     log.clear();
@@ -110,7 +101,7 @@ TEST_F(CloneCancellation, DuringTheTransferStopsTheNextCloneAtItsFirstFile)
 TEST_F(CloneCancellation, DuringTheCheckoutStopsTheTransferOfTheNextClone)
 {
     LogCapture log(git::SeverityProgress);
-    cancelAt(log, "Checkout Notify");
+    cancelAt(log, *interactor_, "Checkout Notify");
     expectCancelled([this] { generate(); });
     log.onRecord(nullptr);
     log.clear();
@@ -126,7 +117,7 @@ TEST_F(CloneCancellation, LeavesNoDescriptorOpen)
     const vclink::test::NoDescriptorLeak noLeak;
     std::filesystem::remove_all(clone_.path());
     LogCapture log(git::SeverityProgress);
-    cancelAt(log, "Checkout Notify");
+    cancelAt(log, *interactor_, "Checkout Notify");
     expectCancelled([this] { generate(); });
     expectCancelled([this] { generate(); });
 }

@@ -13,6 +13,7 @@
 #include "error/logging/severity.hpp"
 #include "support/LogCapture.hpp"
 #include "support/UnprivilegedUser.hpp"
+#include "support/WorkingFolder.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
 
 namespace
@@ -23,27 +24,9 @@ using vclink::test::asUtf8;
 using vclink::test::GitRepository;
 using vclink::test::libGit2FailureOf;
 using vclink::test::Naming;
+using vclink::test::WorkingFolder;
 
 const std::string eastern = "\xE6\x9D\xB1\xE4\xBA\xAC gr\xC3\xBC\xC3\x9F";
-
-/// Sets the process's working folder for the life of the object.
-class WorkingFolder
-{
-  public:
-    explicit WorkingFolder(const std::filesystem::path &folder)
-    {
-        std::filesystem::current_path(folder);
-    }
-    WorkingFolder(const WorkingFolder &) = delete;
-    WorkingFolder &operator=(const WorkingFolder &) = delete;
-    ~WorkingFolder()
-    {
-        std::filesystem::current_path(before_);
-    }
-
-  private:
-    std::filesystem::path before_ = std::filesystem::current_path();
-};
 
 class CloneSpecifier : public vclink::test::CloneTest
 {

@@ -1,29 +1,28 @@
 // SPDX-License-Identifier: MIT
 // Merges with a command, from adapter to merge commit, in hosts of different kinds.
-#include <algorithm>
 #include <csignal>
 #include <cstdlib>
 #include <filesystem>
 #include <string>
 #include <thread>
-#include <vector>
 
-#include <fcntl.h>
 #include <gtest/gtest.h>
-#include <sys/resource.h>
-#include <unistd.h>
 
 #include "../util/SignalAction.hpp"
 #include "DrivenMergeTest.hpp"
+#include "support/ThousandDescriptors.hpp"
 #include "support/UnprivilegedUser.hpp"
+#include "support/WorkingFolder.hpp"
 
 namespace
 {
 
 namespace fs = std::filesystem;
 using vclink::test::NothingLeft;
+using vclink::test::NoWorkingFolder;
 using vclink::test::Scripts;
 using vclink::test::SignalAction;
+using vclink::test::ThousandDescriptors;
 
 class DrivenMergeHost : public vclink::test::DrivenMergeTest
 {
@@ -60,30 +59,19 @@ TEST_F(DrivenMergeHost, MayHandleTheEndOfItsChildren)
 
 TEST_F(DrivenMergeHost, MayHaveAThousandDescriptorsOpen)
 {
-    rlimit before{};
-    ASSERT_EQ(::getrlimit(RLIMIT_NOFILE, &before), 0);
-    rlimit more = before;
-    more.rlim_cur = std::min<rlim_t>(before.rlim_max, 4096);
-    ASSERT_EQ(::setrlimit(RLIMIT_NOFILE, &more), 0);
-    std::vector<int> open;
-    for (int i = 0; i < 1000; ++i)
-        open.push_back(::open("/dev/null", O_RDONLY | O_CLOEXEC));
-    EXPECT_GE(*std::max_element(open.begin(), open.end()), 1000);
-    mergeAnew();
-    for (const int descriptor : open)
-        ::close(descriptor);
-    ::setrlimit(RLIMIT_NOFILE, &before);
+    {
+        const ThousandDescriptors open;
+        mergeAnew();
+    }
     expectJoined();
 }
 
 TEST_F(DrivenMergeHost, MayHaveNoWorkingFolderAnyMore)
 {
-    const fs::path before = fs::current_path();
-    fs::create_directory(folder() / "gone");
-    fs::current_path(folder() / "gone");
-    fs::remove(folder() / "gone");
-    EXPECT_NO_THROW(mergeAnew());
-    fs::current_path(before);
+    {
+        const NoWorkingFolder nowhere(folder().path());
+        EXPECT_NO_THROW(mergeAnew());
+    }
     expectJoined();
 }
 

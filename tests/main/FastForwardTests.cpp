@@ -12,6 +12,7 @@
 #include "error/errorUtil/callbackException.hpp"
 #include "error/logging/severity.hpp"
 #include "support/LogCapture.hpp"
+#include "support/cancelAt.hpp"
 #include "support/text.hpp"
 #include "vclink/util/exception/CancelledOperationException.hpp"
 
@@ -22,9 +23,9 @@ namespace git = vclink::git;
 using testing::ElementsAre;
 using testing::HasSubstr;
 using testing::IsEmpty;
+using vclink::test::cancelAt;
 using vclink::test::LibGit2Failure;
 using vclink::test::LogCapture;
-using vclink::test::LogRecord;
 using vclink::test::NothingChanges;
 using vclink::test::ProgressCall;
 using vclink::test::stateOf;
@@ -178,12 +179,7 @@ TEST_F(FastForward, CancelledAmongTheNotificationsMovesNothing)
 {
     {
         LogCapture log(git::SeverityProgress);
-        log.onRecord(
-            [this](const LogRecord &record)
-            {
-                if (record.message.rfind("Checkout Notify : ", 0) == 0)
-                    interactor_->cancel();
-            });
+        cancelAt(log, *interactor_, "Checkout Notify : ");
         const NothingChanges nothing(repository_);
         EXPECT_EQ(failureOfMerge("topic"), cancellation());
     }

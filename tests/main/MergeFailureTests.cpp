@@ -16,6 +16,7 @@
 #include "error/logging/severity.hpp"
 #include "support/Descriptors.hpp"
 #include "support/LogCapture.hpp"
+#include "support/cancelAt.hpp"
 #include "support/text.hpp"
 #include "vclink/git/GitException.hpp"
 #include "vclink/git/messageIdentifiers.hpp"
@@ -30,9 +31,9 @@ using testing::HasSubstr;
 using testing::IsEmpty;
 using vclink::test::asPath;
 using vclink::test::asUtf8;
+using vclink::test::cancelAt;
 using vclink::test::LibGit2Failure;
 using vclink::test::LogCapture;
-using vclink::test::LogRecord;
 using vclink::test::NothingChanges;
 using vclink::test::stateOf;
 using vclink::test::textOf;
@@ -56,11 +57,7 @@ class MergeOptionsFactory : public vclink::test::TestOptionsFactory
 class MergeFailure : public vclink::test::MergeTest
 {
   protected:
-    void makeAhead()
-    {
-        makeBranch("topic", [this] { repository_.write("new", "x"); });
-    }
-    void makeDiverged()
+    void divergeInTwoFiles()
     {
         diverge(
             [this]
@@ -158,7 +155,7 @@ TEST_F(MergeFailure, OfAMergeUnderWayTellsSoAndTouchesNothing)
 
 TEST_F(MergeFailure, OfAMergeResolvedAndNotCommittedTellsSo)
 {
-    makeDiverged();
+    divergeInTwoFiles();
     repository_.git({"merge", "--quiet", "--no-commit", "topic"});
     const NothingChanges nothing(repository_);
     EXPECT_EQ(failureOfMerge("topic"),
@@ -167,7 +164,7 @@ TEST_F(MergeFailure, OfAMergeResolvedAndNotCommittedTellsSo)
 
 TEST_F(MergeFailure, OfAnyOtherOperationUnderWayTellsSo)
 {
-    makeDiverged();
+    divergeInTwoFiles();
     const std::string head = idOf("topic") + '\n';
     const std::vector<std::string> underWay{
         "REVERT_HEAD",           "CHERRY_PICK_HEAD",     "BISECT_LOG", "rebase-merge/interactive",
@@ -203,7 +200,7 @@ TEST_F(MergeFailure, OfConflictsTellsSo)
 
 TEST_F(MergeFailure, WithoutAnIdentityLeavesTheMergeToBeCommitted)
 {
-    makeDiverged();
+    divergeInTwoFiles();
     repository_.git({"config", "--unset", "user.name"});
     repository_.git({"config", "--unset", "user.email"});
     const std::string head = idOf("HEAD");
@@ -223,7 +220,7 @@ TEST_F(MergeFailure, WithoutAnIdentityLeavesTheMergeToBeCommitted)
 
 TEST_F(MergeFailure, OfAMergeWhileTheIndexIsLockedChangesNoFile)
 {
-    makeDiverged();
+    divergeInTwoFiles();
     repository_.write(".git/index.lock", "");
     auto before = stateOf(repository_);
     EXPECT_THAT(failureOfMerge("topic"), HasSubstr("(code -14, "));
@@ -234,7 +231,7 @@ TEST_F(MergeFailure, OfAMergeWhileTheIndexIsLockedChangesNoFile)
 
 TEST_F(MergeFailure, OfACancelledCheckoutTellsWhatTheCancellationSays)
 {
-    makeDiverged();
+    divergeInTwoFiles();
     interactor_->cancel();
     const auto before = stateOf(repository_);
     EXPECT_EQ(failureOfMerge("topic"), cancellation());
@@ -247,16 +244,11 @@ TEST_F(MergeFailure, OfACancelledCheckoutTellsWhatTheCancellationSays)
 
 TEST_F(MergeFailure, OfAMergeCancelledInTheMiddleLeavesTheHead)
 {
-    makeDiverged();
+    divergeInTwoFiles();
     const auto before = stateOf(repository_);
     {
         LogCapture log(git::SeverityProgress);
-        log.onRecord(
-            [this](const LogRecord &record)
-            {
-                if (record.message.rfind("Checkout Notify : ", 0) == 0)
-                    interactor_->cancel();
-            });
+        cancelAt(log, *interactor_, "Checkout Notify : ");
         EXPECT_EQ(failureOfMerge("topic"), cancellation());
     }
     const auto after = stateOf(repository_);
@@ -285,7 +277,7 @@ TEST_F(MergeFailure, OfACommandThatCannotBeStartedTellsWhatBoostSays)
 
 TEST_F(MergeFailure, OfAStandardExceptionTellsItsWhat)
 {
-    makeDiverged();
+    divergeInTwoFiles();
     const NothingChanges nothing(repository_);
     EXPECT_EQ(addedTextOf([] { throw std::logic_error("gr\xC3\xBC\xC3\x9F"); }),
               "gr\xC3\xBC\xC3\x9F");
@@ -295,7 +287,7 @@ TEST_F(MergeFailure, OfAStandardExceptionTellsItsWhat)
 
 TEST_F(MergeFailure, OfAnExceptionWithAMessageTellsIt)
 {
-    makeDiverged();
+    divergeInTwoFiles();
     const NothingChanges nothing(repository_);
     EXPECT_EQ(
         addedTextOf([] { throw git::GitException(shared_vclink::git::NoUserName(), u"more"); }),
@@ -304,7 +296,7 @@ TEST_F(MergeFailure, OfAnExceptionWithAMessageTellsIt)
 
 TEST_F(MergeFailure, OfAnythingElseComesOutUnchanged)
 {
-    makeDiverged();
+    divergeInTwoFiles();
     const NothingChanges nothing(repository_);
     try
     {
@@ -319,7 +311,7 @@ TEST_F(MergeFailure, OfAnythingElseComesOutUnchanged)
 
 TEST_F(MergeFailure, ReleasesAllThatItOpened)
 {
-    makeDiverged();
+    divergeInTwoFiles();
     EXPECT_ANY_THROW(mergeRaising([] { throw 42; }));
     const vclink::test::NoDescriptorLeak noLeak;
     EXPECT_ANY_THROW(mergeRaising([] { throw 42; }));

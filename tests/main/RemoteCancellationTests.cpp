@@ -8,6 +8,7 @@
 #include "RemoteTest.hpp"
 #include "error/logging/severity.hpp"
 #include "support/LogCapture.hpp"
+#include "support/cancelAt.hpp"
 
 namespace
 {
@@ -16,27 +17,13 @@ namespace git = vclink::git;
 using testing::Contains;
 using testing::Not;
 using testing::StartsWith;
+using vclink::test::cancelAt;
 using vclink::test::expectCancelled;
 using vclink::test::LogCapture;
-using vclink::test::LogRecord;
 using vclink::test::stateOf;
 
 class RemoteCancellation : public vclink::test::RemoteTest
 {
-  protected:
-    /// Asks for cancellation at the first record that begins like this.
-    void cancelAt(LogCapture &log, const std::string &beginning)
-    {
-        log.onRecord(
-            [this, beginning, asked = false](const LogRecord &record) mutable
-            {
-                if (!asked && record.message.compare(0, beginning.size(), beginning) == 0)
-                {
-                    asked = true;
-                    interactor_->cancel();
-                }
-            });
-    }
 };
 
 TEST_F(RemoteCancellation, AskedForBeforeStopsAFetchAtItsFirstPollPoint)
@@ -61,7 +48,7 @@ TEST_F(RemoteCancellation, DuringTheTransferStopsAFetch)
 {
     const auto before = stateOf(repository_);
     LogCapture log(git::SeverityProgress);
-    cancelAt(log, "Transfer Progress");
+    cancelAt(log, *interactor_, "Transfer Progress");
     expectCancelled([this] { fetch(); });
     EXPECT_EQ(stateOf(repository_), before);
     EXPECT_NO_THROW(fetch());
@@ -72,7 +59,7 @@ TEST_F(RemoteCancellation, DuringTheTransferStopsAFetch)
 TEST_F(RemoteCancellation, WhileTheServerTalksStopsAFetch)
 {
     LogCapture log(git::SeverityParameter);
-    cancelAt(log, " msgStr=");
+    cancelAt(log, *interactor_, " msgStr=");
     expectCancelled([this] { fetch(); });
     EXPECT_NO_THROW(fetch());
 }
@@ -94,7 +81,7 @@ TEST_F(RemoteCancellation, OfAFetchStillStopsTheNextCheckout)
     commit("file", "of the topic\n");
     publish("file", "changed\n");
     LogCapture log(git::SeverityProgress);
-    cancelAt(log, "Transfer Progress");
+    cancelAt(log, *interactor_, "Transfer Progress");
     expectCancelled([this] { fetch(); });
     log.clear();
     expectCancelled([this] { branches().switchBranch("main"); });

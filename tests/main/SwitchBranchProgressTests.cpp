@@ -9,6 +9,7 @@
 #include "error/errorUtil/callbackException.hpp"
 #include "error/logging/severity.hpp"
 #include "support/LogCapture.hpp"
+#include "support/cancelAt.hpp"
 #include "vclink/util/exception/CancelledOperationException.hpp"
 
 namespace
@@ -17,8 +18,8 @@ namespace
 namespace git = vclink::git;
 using testing::ElementsAre;
 using testing::IsEmpty;
+using vclink::test::cancelAt;
 using vclink::test::LogCapture;
-using vclink::test::LogRecord;
 using vclink::test::NothingChanges;
 using vclink::test::ProgressCall;
 using vclink::test::stateOf;
@@ -72,12 +73,7 @@ TEST_F(SwitchBranchProgress, CancelledAmongTheNotificationsMovesNothing)
 {
     {
         LogCapture log(git::SeverityProgress);
-        log.onRecord(
-            [this](const LogRecord &record)
-            {
-                if (record.message.rfind("Checkout Notify : ", 0) == 0)
-                    interactor_->cancel();
-            });
+        cancelAt(log, *interactor_, "Checkout Notify : ");
         const NothingChanges nothing(repository_);
         expectCancelled("topic");
     }

@@ -1,30 +1,28 @@
 // SPDX-License-Identifier: MIT
 // Merges through a command in hosts of different kinds.
 #include <algorithm>
-#include <cerrno>
 #include <csignal>
 #include <cstdlib>
 #include <filesystem>
 #include <string>
 #include <thread>
-#include <vector>
 
-#include <fcntl.h>
 #include <gtest/gtest.h>
-#include <sys/resource.h>
-#include <unistd.h>
 
 #include "MergeDriverTest.hpp"
 #include "SignalAction.hpp"
+#include "support/ThousandDescriptors.hpp"
 #include "support/UnprivilegedUser.hpp"
-#include "util/processError.hpp"
+#include "support/WorkingFolder.hpp"
 
 namespace
 {
 
 namespace fs = std::filesystem;
+using vclink::test::NoWorkingFolder;
 using vclink::test::Scripts;
 using vclink::test::SignalAction;
+using vclink::test::ThousandDescriptors;
 
 class MergeDriverHost : public vclink::test::MergeDriverTest
 {
@@ -53,30 +51,16 @@ TEST_F(MergeDriverHost, MayIgnoreOrTakeASignalOfABrokenPipe)
 
 TEST_F(MergeDriverHost, MayHaveAThousandDescriptorsOpen)
 {
-    rlimit before{};
-    ASSERT_EQ(::getrlimit(RLIMIT_NOFILE, &before), 0);
-    rlimit more = before;
-    more.rlim_cur = std::min<rlim_t>(before.rlim_max, 4096);
-    ASSERT_EQ(::setrlimit(RLIMIT_NOFILE, &more), 0);
-    std::vector<int> open;
-    for (int i = 0; i < 1000; ++i)
-        open.push_back(::open("/dev/null", O_RDONLY | O_CLOEXEC));
-    EXPECT_GE(*std::max_element(open.begin(), open.end()), 1000);
+    const ThousandDescriptors open;
     expectMerged();
-    for (const int descriptor : open)
-        ::close(descriptor);
-    ::setrlimit(RLIMIT_NOFILE, &before);
 }
 
 TEST_F(MergeDriverHost, MayHaveNoWorkingFolderAnyMore)
 {
-    const fs::path before = fs::current_path();
-    fs::create_directory(folder() / "gone");
-    fs::current_path(folder() / "gone");
-    fs::remove(folder() / "gone");
-    const int code = merge();
-    fs::current_path(before);
-    EXPECT_EQ(code, 0);
+    {
+        const NoWorkingFolder nowhere(folder().path());
+        EXPECT_EQ(merge(), 0);
+    }
     EXPECT_EQ(staged("file"), "ours\nbase\ntheirs\n");
 }
 

@@ -1,6 +1,5 @@
 // SPDX-License-Identifier: MIT
 // Commands that run in hosts of different kinds.
-#include <algorithm>
 #include <array>
 #include <atomic>
 #include <cerrno>
@@ -14,7 +13,6 @@
 
 #include <fcntl.h>
 #include <gtest/gtest.h>
-#include <sys/resource.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
@@ -22,6 +20,8 @@
 #include "SignalAction.hpp"
 #include "support/Command.hpp"
 #include "support/LogCapture.hpp"
+#include "support/ThousandDescriptors.hpp"
+#include "support/WorkingFolder.hpp"
 #include "util/processError.hpp"
 #include "util/runCommand.hpp"
 
@@ -31,7 +31,9 @@ namespace
 namespace fs = std::filesystem;
 using vclink::git::runCommand;
 using vclink::test::NothingLeft;
+using vclink::test::NoWorkingFolder;
 using vclink::test::SignalAction;
+using vclink::test::ThousandDescriptors;
 
 class RunCommandHost : public vclink::test::RunCommandTest
 {
@@ -147,33 +149,18 @@ TEST_F(RunCommandHost, MayIgnoreOrTakeASignalOfABrokenPipe)
 
 TEST_F(RunCommandHost, MayHaveAThousandDescriptorsOpen)
 {
-    rlimit before{};
-    ASSERT_EQ(::getrlimit(RLIMIT_NOFILE, &before), 0);
-    rlimit more = before;
-    more.rlim_cur = std::min<rlim_t>(before.rlim_max, 4096);
-    ASSERT_EQ(::setrlimit(RLIMIT_NOFILE, &more), 0);
-    std::vector<int> open;
-    for (int i = 0; i < 1000; ++i)
-        open.push_back(::open("/dev/null", O_RDONLY | O_CLOEXEC));
-    EXPECT_GE(*std::max_element(open.begin(), open.end()), 1000);
+    const ThousandDescriptors open;
     EXPECT_EQ(resultOf(scripts_.shell("echo x; exit 4")), 4);
     EXPECT_EQ(outputOf("echo x"), "x");
     EXPECT_EQ(run("/nowhere/tool").error.value(), ENOENT);
-    for (const int descriptor : open)
-        ::close(descriptor);
-    ::setrlimit(RLIMIT_NOFILE, &before);
 }
 
 TEST_F(RunCommandHost, MayHaveNoWorkingFolderAnyMore)
 {
     const std::string program = scripts_.shell("exit 4");
-    const fs::path before = fs::current_path();
-    fs::create_directory(folder() / "gone");
-    fs::current_path(folder() / "gone");
-    fs::remove(folder() / "gone");
+    const NoWorkingFolder nowhere(folder().path());
     EXPECT_EQ(resultOf(program), 4);
     EXPECT_EQ(run("no-such-tool-anywhere").error.value(), ENOENT);
-    fs::current_path(before);
 }
 
 TEST_F(RunCommandHost, MayHaveClosedItsStandardStreams)

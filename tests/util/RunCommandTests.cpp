@@ -12,12 +12,14 @@
 
 #include "RunCommandTest.hpp"
 #include "support/Descriptors.hpp"
+#include "support/WorkingFolder.hpp"
 
 namespace
 {
 
 using testing::ElementsAre;
 using vclink::test::Scripts;
+using vclink::test::WorkingFolder;
 
 class RunCommand : public vclink::test::RunCommandTest
 {
@@ -111,21 +113,16 @@ TEST_F(RunCommand, LooksAProgramWithoutASlashUpInThePath)
 TEST_F(RunCommand, PrefersAProgramOfTheWorkingFolderToThePath)
 {
     const std::filesystem::path program = scripts_.shell("exit 43");
-    const std::filesystem::path before = std::filesystem::current_path();
     std::filesystem::create_directory(folder() / "cwd");
     std::filesystem::copy(program, folder() / "cwd" / "true");
-    std::filesystem::current_path(folder() / "cwd");
-    const int result = resultOf("true");
-    std::filesystem::current_path(before);
-    EXPECT_EQ(result, 43);
+    const WorkingFolder there(folder() / "cwd");
+    EXPECT_EQ(resultOf("true"), 43);
 }
 
 TEST_F(RunCommand, RunsInTheWorkingFolderOfTheProcess)
 {
-    const std::filesystem::path before = std::filesystem::current_path();
-    std::filesystem::current_path(folder().path());
+    const WorkingFolder there(folder().path());
     EXPECT_EQ(outputOf("pwd"), folder().path().string());
-    std::filesystem::current_path(before);
 }
 
 TEST_F(RunCommand, HandsTheWholeEnvironmentOver)
