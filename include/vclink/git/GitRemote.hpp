@@ -20,8 +20,9 @@ namespace vclink::git
 ///
 /// Access: plain paths, file://, git://, http://, https:// and ssh:// as libgit2 has them. The only
 /// credentials are the keys of the ssh agent that SSH_AUTH_SOCK names, with the user that the URL
-/// names; nobody is asked for anything. No proxy is used. Every certificate and every host key is
-/// accepted. There is no time limit: a remote that stays silent keeps the operation waiting.
+/// names, and a password that stands in the URL; nobody is asked for anything. No proxy is used.
+/// Every certificate and every host key is accepted. There is no time limit: a remote that stays
+/// silent keeps the operation waiting.
 ///
 /// Each operation throws LibGit2Exception, with libgit2's text, when a call to libgit2 fails: a
 /// name that the repository does not know, a remote that can't be reached or that refuses access.
