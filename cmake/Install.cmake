@@ -22,4 +22,8 @@ if(VCLINK_BUILD_EXAMPLES)
         DESTINATION "${CMAKE_INSTALL_DATADIR}/bash-completion/completions"
         RENAME vclink-shell
         COMPONENT shell)
+    install(FILES examples/shell/completion.zsh
+        DESTINATION "${CMAKE_INSTALL_DATADIR}/zsh/vendor-completions"
+        RENAME _vclink-shell
+        COMPONENT shell)
 endif()
