@@ -11,6 +11,18 @@ install(DIRECTORY include/
 vclink_install_package_files(vclink_git "${PROJECT_SOURCE_DIR}/cmake/package"
     COMPONENT development)
 
+# Laid as they are here, so that their links lead to each other, and to the smallest host.
+install(FILES README.md
+    DESTINATION share/doc/libvclink-git-dev
+    COMPONENT development)
+install(DIRECTORY docs
+    DESTINATION share/doc/libvclink-git-dev
+    COMPONENT development
+    FILES_MATCHING PATTERN "*.md")
+install(FILES examples/embed/CMakeLists.txt examples/embed/main.cpp
+    DESTINATION share/doc/libvclink-git-dev/examples/embed
+    COMPONENT development)
+
 if(VCLINK_BUILD_EXAMPLES)
     install(TARGETS vclink-shell
         RUNTIME DESTINATION "${CMAKE_INSTALL_BINDIR}"

@@ -23,6 +23,22 @@ set(CPACK_DEBIAN_PACKAGE_SHLIBDEPS_PRIVATE_DIRS "${VCLINK_STAGE_DIR}/${CMAKE_INS
 set(CPACK_DEBIAN_PACKAGE_GENERATE_SHLIBS ON)
 set(CPACK_DEBIAN_PACKAGE_GENERATE_SHLIBS_POLICY ">=")
 
+# The licence as Debian's tools read it: indented, a full stop where a line is empty.
+file(READ "${PROJECT_SOURCE_DIR}/LICENSE" licence)
+string(REGEX REPLACE ".*\nCopyright \\(c\\) ([^\n]+)\n+(.*)" "\\1" holder "${licence}")
+string(REGEX REPLACE ".*\nCopyright \\(c\\) ([^\n]+)\n+(.*[^\n])\n*" "\n\\2" terms "${licence}")
+string(REGEX REPLACE "\n([^\n])" "\n \\1" terms "${terms}")
+string(REPLACE "\n\n" "\n .\n" terms "${terms}")
+set(copyright "${PROJECT_BINARY_DIR}/package/copyright")
+file(CONFIGURE OUTPUT "${copyright}" CONTENT
+"Format: https://www.debian.org/doc/packaging-manuals/copyright-format/1.0/
+Upstream-Name: vclink-git
+
+Files: *
+Copyright: @holder@
+License: Expat@terms@
+" @ONLY)
+
 # vclink_package(COMPONENT NAME SECTION SUMMARY [DEPENDS text]): a component as a package.
 macro(vclink_package component name section summary)
     cmake_parse_arguments(package "" "DEPENDS" "" ${ARGN})
@@ -31,9 +47,8 @@ macro(vclink_package component name section summary)
     set(CPACK_DEBIAN_${upper}_PACKAGE_SECTION ${section})
     set(CPACK_COMPONENT_${upper}_DESCRIPTION "${summary}")
     set(CPACK_DEBIAN_${upper}_PACKAGE_DEPENDS "${package_DEPENDS}")
-    install(FILES "${PROJECT_SOURCE_DIR}/LICENSE"
+    install(FILES "${copyright}"
         DESTINATION share/doc/${name}
-        RENAME copyright
         COMPONENT ${component})
 endmacro()
 
@@ -58,7 +73,8 @@ if(VCLINK_HOST STREQUAL "source")
     list(APPEND CPACK_COMPONENTS_ALL host-runtime host-development)
     vclink_package(host-runtime ${host_runtime} libs
         "Stand-in for the SDK of a desktop application
- Where the application's own SDK is installed, it takes the place of this library.")
+ Where the application's own SDK is installed, it takes the place of this
+ library.")
     vclink_package(host-development libvclink-host-dev libdevel
         "Stand-in for the SDK of a desktop application, for developers
  Headers, and what finds the stand-in from CMake and from pkg-config."

@@ -2,6 +2,9 @@
 // The Debian packages, which the fixture of these tests has made: what they say of themselves, and
 // that a host is built against what they hold.
 #include <filesystem>
+#include <fstream>
+#include <istream>
+#include <iterator>
 #include <map>
 #include <regex>
 #include <sstream>
@@ -135,6 +138,31 @@ TEST_F(DebianPackages, HoldFilesOfRootThatOthersCantWrite)
             EXPECT_THAT(line, HasSubstr(" root/root ")) << package.first;
             EXPECT_TRUE(line[0] == 'l' || (line[5] == '-' && line[8] == '-')) << line;
         }
+    }
+}
+
+TEST_F(DebianPackages, TellTheLicenceAsDebiansToolsReadIt)
+{
+    std::ifstream file(VCLINK_SOURCE_FOLDER "/LICENSE");
+    std::string head;
+    std::string holder;
+    std::getline(std::getline(file, head) >> std::ws, holder);
+    std::string expected =
+        "Format: https://www.debian.org/doc/packaging-manuals/"
+        "copyright-format/1.0/\nUpstream-Name: vclink-git\n\nFiles: *\n" +
+        std::regex_replace(holder, std::regex("^Copyright \\(c\\)"), "Copyright:") +
+        "\nLicense: Expat\n";
+    file >> std::ws;
+    for (std::string line; std::getline(file, line);)
+    {
+        expected += line.empty() ? " .\n" : " " + line + "\n";
+    }
+    for (const auto &package : packages())
+    {
+        unpack({package.first});
+        std::ifstream copyright(folder() / "machine/usr/share/doc" / package.first / "copyright");
+        EXPECT_EQ(std::string(std::istreambuf_iterator<char>(copyright), {}), expected)
+            << package.first;
     }
 }
 

@@ -74,14 +74,26 @@ TEST_F(Component, RuntimeIsTheLibraryAlone)
               "libvclink_git.so." + version);
 }
 
-TEST_F(Component, DevelopmentIsTheExportedHeadersAndWhatFindsTheLibrary)
+TEST_F(Component, DevelopmentIsTheExportedHeadersWhatFindsTheLibraryAndTheDocuments)
 {
     auto expected = headersOf("include", "include/");
     for (const auto &name : developmentFiles("vclink_git"))
     {
         expected.push_back(name);
     }
-    expected.emplace_back("share/doc/libvclink-git-dev/copyright");
+    const std::string documents = "share/doc/libvclink-git-dev/";
+    for (const auto *name :
+         {"copyright", "README.md", "examples/embed/CMakeLists.txt", "examples/embed/main.cpp"})
+    {
+        expected.push_back(documents + name);
+    }
+    for (const auto &name : filesBelow(VCLINK_SOURCE_FOLDER "/docs"))
+    {
+        if (std::filesystem::path(name).extension() == ".md")
+        {
+            expected.push_back(documents + "docs/" + name);
+        }
+    }
     EXPECT_THAT(filesOf("development"), ElementsAreArray(sorted(expected)));
 }
 
@@ -107,6 +119,15 @@ TEST_F(Component, HostDevelopmentIsTheHeadersOfTheStandIn)
     }
     expected.emplace_back("share/doc/libvclink-host-dev/copyright");
     EXPECT_THAT(filesOf("host-development"), ElementsAreArray(sorted(expected)));
+}
+
+TEST_F(Component, ShellIsTheProgramItsManualAndItsCompletions)
+{
+    EXPECT_THAT(filesOf("shell"),
+                ElementsAreArray(sorted({"bin/vclink-shell", "share/man/man1/vclink-shell.1",
+                                         "share/bash-completion/completions/vclink-shell",
+                                         "share/zsh/vendor-completions/_vclink-shell",
+                                         "share/doc/vclink-shell/copyright"})));
 }
 
 TEST_F(Component, ShellRunsFromWhereverItIsInstalled)
