@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: MIT
+#include <algorithm>
 #include <string>
 #include <utility>
 #include <vector>
@@ -20,18 +21,18 @@ class Withheld
   public:
     Withheld(const fs::path &path, mode_t mode)
     {
-        // Before the folders can't be entered any more.
-        std::vector<fs::path> places{path};
+        save(path);
         if (fs::is_directory(path))
         {
             for (const auto &entry : fs::recursive_directory_iterator(path))
             {
                 if (!entry.is_symlink() && entry.is_directory())
-                    places.push_back(entry.path());
+                    save(entry.path());
             }
         }
-        for (const auto &place : places)
-            set(place, mode);
+        // A folder comes after those in it, which can't be reached any more then.
+        std::for_each(saved_.rbegin(), saved_.rend(),
+                      [mode](const auto &place) { ::chmod(place.first.c_str(), mode); });
     }
     Withheld(const Withheld &) = delete;
     Withheld &operator=(const Withheld &) = delete;
@@ -45,12 +46,11 @@ class Withheld
     }
 
   private:
-    void set(const fs::path &path, mode_t mode)
+    void save(const fs::path &path)
     {
         struct stat status = {};
         ::stat(path.c_str(), &status);
         saved_.emplace_back(path, status.st_mode);
-        ::chmod(path.c_str(), mode);
     }
 
     std::vector<std::pair<fs::path, mode_t>> saved_;
