@@ -187,6 +187,33 @@ TEST_F(RunCommandFailure, OfThePipeIsAnErrorWithoutARecord)
     }
 }
 
+/// With standard streams closed, the pipe gets their numbers, and has to move off them.
+TEST_F(RunCommandFailure, OfThePipesMoveNamesTheCall)
+{
+    useEveryKindOfObject();
+    const std::array<int, 2> saved{::fcntl(STDIN_FILENO, F_DUPFD_CLOEXEC, 3),
+                                   ::fcntl(STDOUT_FILENO, F_DUPFD_CLOEXEC, 3)};
+    std::string text;
+    {
+        const DescriptorLimit standardStreamsOnly(STDERR_FILENO + 1);
+        ::close(STDIN_FILENO);
+        ::close(STDOUT_FILENO);
+        try
+        {
+            runCommand("/bin/true", {});
+        }
+        catch (const boost::process::process_error &error)
+        {
+            text = error.what();
+        }
+        ::dup2(saved[0], STDIN_FILENO);
+        ::dup2(saved[1], STDOUT_FILENO);
+    }
+    for (const int descriptor : saved)
+        ::close(descriptor);
+    EXPECT_EQ(text, "fcntl(2) failed: Invalid argument");
+}
+
 TEST_F(RunCommandFailure, LeavesNothingAtAnyNumberOfDescriptorsLeft)
 {
     useEveryKindOfObject();

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "util/SigpipeGuard.hpp"
 
+#include <array>
 #include <cerrno>
 #include <csignal>
 #include <cstdlib>
@@ -147,6 +148,14 @@ class BlockedSigpipe
     std::_Exit(error == EPIPE && !isBlocked(SIGPIPE) && !isPending() ? 0 : 1);
 }
 
+/// Sets every bit where the variables of the next call will be.
+[[gnu::noinline]] void leaveBitsOnTheStack()
+{
+    std::array<volatile unsigned char, 4096> bytes;
+    for (auto &byte : bytes)
+        byte = 0xFF;
+}
+
 TEST(SigpipeGuardDeathTest, LetsABrokenConnectionFailWithoutEndingTheProcess)
 {
     EXPECT_EXIT(breakConnection(true), testing::ExitedWithCode(0), "");
@@ -164,6 +173,14 @@ TEST(SigpipeGuard, BlocksTheSignalForItsLife)
         EXPECT_FALSE(isBlocked(SIGTERM));
     }
     EXPECT_FALSE(isBlocked(SIGPIPE));
+}
+
+TEST(SigpipeGuard, BlocksNoOtherSignal)
+{
+    leaveBitsOnTheStack();
+    const SigpipeGuard guard;
+    for (int signal = 1; signal < 32; ++signal)
+        EXPECT_EQ(isBlocked(signal), signal == SIGPIPE) << signal;
 }
 
 TEST(SigpipeGuard, LeavesASignalBlockedThatWasBlocked)
