@@ -146,7 +146,7 @@ void BasicBranchManager::merge(BranchName name)
 std::string BasicBranchManager::getRepositoryState() const
 {
     const OwnedHandle<git_repository> repository = adapter_.getRepository();
-    return describeRepositoryState(git_repository_state(repository.get()));
+    return describeRepositoryState(readRepositoryState(repository.get()));
 }
 
 std::string describeRepositoryState(int state)

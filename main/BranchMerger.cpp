@@ -63,7 +63,7 @@ void BranchMerger::performMerge(const BranchName &name)
 
 void BranchMerger::decide(const BranchName &name, git_repository *repository)
 {
-    if (git_repository_state(repository) != GIT_REPOSITORY_STATE_NONE)
+    if (readRepositoryState(repository) != GIT_REPOSITORY_STATE_NONE)
     {
         raise(shared_vclink::git::UnableToMergeBadRepositoryState());
     }

@@ -75,7 +75,7 @@ void GitAdapter::commit(const upath & /*folder*/, const ustring &message)
     {
         parents.push_back(head.value().get());
     }
-    if (git_repository_state(repository.get()) == GIT_REPOSITORY_STATE_MERGE)
+    if (readRepositoryState(repository.get()) == GIT_REPOSITORY_STATE_MERGE)
     {
         mergeHeads = lookupMergeHeads(repository.get());
         for (const auto &mergeHead : mergeHeads)
@@ -105,7 +105,7 @@ void GitAdapter::createCommit(git_repository *repository, const ustring &message
                                  parentPointers.data()))
         .value();
     throwIfNotWritten(repository, id);
-    makeResult(git_repository_state_cleanup(repository)).value();
+    cleanUpRepositoryState(repository);
 }
 
 } // namespace vclink::git

@@ -35,6 +35,22 @@ void readAgainIfEmpty(git_index *index)
     }
 }
 
+/// libgit2 takes a file that it can't look at for one that is not there.
+bool hasMergeHead(git_repository *repository)
+{
+    const std::string path = git_repository_path(repository) + std::string("MERGE_HEAD");
+    struct stat status = {};
+    if (::stat(path.c_str(), &status) == 0)
+    {
+        return true;
+    }
+    if (errno != ENOENT)
+    {
+        raiseSystemError(errno, "could not read '" + path + "'");
+    }
+    return false;
+}
+
 } // namespace
 
 bool isRepository(const upath &path)
@@ -56,6 +72,25 @@ OwnedHandle<git_repository> openRepository(const upath &root)
     return acquire<git_repository>(git_repository_open_ext, folder.c_str(),
                                    GIT_REPOSITORY_OPEN_NO_SEARCH, nullptr)
         .value();
+}
+
+int readRepositoryState(git_repository *repository)
+{
+    const int state = git_repository_state(repository);
+    // The commit that concludes a merge would forget the other side.
+    return state == GIT_REPOSITORY_STATE_NONE && hasMergeHead(repository)
+               ? git_repository_state(repository)
+               : state;
+}
+
+void cleanUpRepositoryState(git_repository *repository)
+{
+    makeResult(git_repository_state_cleanup(repository)).value();
+    // The next commit would be one of the same merge.
+    if (hasMergeHead(repository))
+    {
+        makeResult(git_repository_state_cleanup(repository)).value();
+    }
 }
 
 OwnedHandle<git_index> getRepositoryIndex(git_repository *repository)

@@ -22,6 +22,13 @@ bool isRepository(const upath &path);
 /// Opens the repository of exactly this folder. git_repository_open_ext. Raises.
 OwnedHandle<git_repository> openRepository(const upath &root);
 
+/// What is under way, a number of git_repository_state_t. git_repository_state, and once more where
+/// it says that nothing is and MERGE_HEAD stands. Raises when that can't be looked at.
+int readRepositoryState(git_repository *repository);
+
+/// git_repository_state_cleanup, and once more where MERGE_HEAD stands after it. Raises.
+void cleanUpRepositoryState(git_repository *repository);
+
 /// git_repository_index, and for an empty index git_index_read, to be sure. Raises.
 OwnedHandle<git_index> getRepositoryIndex(git_repository *repository);
 

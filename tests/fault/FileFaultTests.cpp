@@ -7,6 +7,7 @@
 #include <iterator>
 #include <map>
 #include <random>
+#include <set>
 #include <sstream>
 #include <string>
 #include <vector>
@@ -151,31 +152,43 @@ TEST_P(FailingFileCall, LeavesTheRepositoryInOrder)
     std::cout << '\n';
 }
 
-/// Files in what a commit takes over from the index and the working tree.
+/// A commit of what stands in the index, the working tree and the files that tell of a merge.
 class CommitOverFailingCall : public FailingFileCall
 {
+  protected:
+    /// The files of the commit at HEAD, and its parents.
+    std::string committed() const
+    {
+        const GitRepository &repository = trial_.repository();
+        return repository.git({"ls-tree", "-r", "HEAD"}) +
+               repository.git({"log", "-1", "--format=%P"});
+    }
 };
 
 /// libgit2 takes what it can't look at for what is not there.
-TEST_P(CommitOverFailingCall, FailsOrHoldsEveryFile)
+TEST_P(CommitOverFailingCall, FailsOrHoldsEveryFileAndParent)
 {
-    const std::vector<std::string> list{"ls-tree", "-r", "HEAD"};
-    const std::string expected = trial_.repository().git(list);
+    trial_.begin()();
+    const std::string expected = committed();
     const int count = countCalls();
     for (int call = 1; call <= count; ++call)
     {
         const auto action = trial_.begin();
-        const std::string before = trial_.repository().git(list);
+        const std::string before = committed();
         std::string function;
+        std::string outcome;
         {
             const FailingFiles failing(call, EIO);
-            outcomeOf(action);
+            outcome = outcomeOf(action);
             function = failing.failed();
         }
-        const std::string after = trial_.repository().git(list);
-        EXPECT_TRUE(after == expected || after == before)
-            << "call " << call << ", " << function << ":\n"
-            << after;
+        SCOPED_TRACE("call " + std::to_string(call) + ", " + function + ": " + outcome);
+        const std::string after = committed();
+        EXPECT_TRUE(after == expected || after == before) << after;
+        if (outcome == trial_.normalOutcome())
+        {
+            EXPECT_EQ(trial_.gist(), trial_.normalGist());
+        }
     }
 }
 
@@ -230,17 +243,19 @@ TEST_P(FailingLookAtTheIndex, LosesNoEntry)
 INSTANTIATE_TEST_SUITE_P(Of, FailingLookAtTheIndex, testing::ValuesIn(writingOperations()),
                          vclink::test::nameOfTest);
 
-std::vector<Operation> ordinaryCommit()
+/// Of changed files, of a working copy in which some are not checked out, and of a merge.
+std::vector<Operation> commitsOfFiles()
 {
+    const std::set<std::string> names{"commit", "commitSparse", "commitMerge"};
     std::vector<Operation> operations = writingOperations();
-    const auto others =
-        std::remove_if(operations.begin(), operations.end(),
-                       [](const Operation &operation) { return operation.name != "commit"; });
+    const auto others = std::remove_if(operations.begin(), operations.end(),
+                                       [&names](const Operation &operation)
+                                       { return names.count(operation.name) == 0; });
     operations.erase(others, operations.end());
     return operations;
 }
 
-INSTANTIATE_TEST_SUITE_P(Of, CommitOverFailingCall, testing::ValuesIn(ordinaryCommit()),
+INSTANTIATE_TEST_SUITE_P(Of, CommitOverFailingCall, testing::ValuesIn(commitsOfFiles()),
                          vclink::test::nameOfTest);
 
 INSTANTIATE_TEST_SUITE_P(Of, FailingFileCall, testing::ValuesIn(writingOperations()),

@@ -83,7 +83,8 @@ std::string Trial::gist() const
     return line({"status", "--porcelain=v2", "--untracked-files=all"}) +
            line({"ls-files", "--stage"}) + line({"symbolic-ref", "HEAD"}) +
            line({"for-each-ref", "--format=%(refname) %(tree)"}) +
-           line({"log", "--all", "--format=%s, %an, %T"}) + line({"rev-parse", "MERGE_HEAD"}) +
+           line({"log", "--all", "--format=%s, %an, %T"}) +
+           line({"log", "--all", "--merges", "--format=%s"}) + line({"rev-parse", "MERGE_HEAD"}) +
            GitRepository(home_).read(".gitconfig");
 }
 
