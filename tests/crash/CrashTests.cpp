@@ -2,6 +2,7 @@
 #include <algorithm>
 #include <chrono>
 #include <cstdlib>
+#include <filesystem>
 #include <iostream>
 #include <map>
 #include <set>
@@ -38,10 +39,21 @@ std::uint64_t numberFrom(const char *variable, std::uint64_t otherwise)
     return text == nullptr ? otherwise : std::strtoull(text, nullptr, 10);
 }
 
-/// Workers that are killed one after the other. VCLINK_KILLS says how many, VCLINK_SEED when.
+/// Workers that are killed one after the other. VCLINK_KILLS says how many, VCLINK_SEED when. With
+/// VCLINK_KEEP the workplace of a test that fails stays, beside where the test's folder was.
 class Crash : public GitTest
 {
   protected:
+    using Counts = std::map<std::string, std::size_t>;
+
+    void TearDown() override
+    {
+        if (!HasFailure() || std::getenv("VCLINK_KEEP") == nullptr)
+            return;
+        const std::string kept = folder().path().string() + "-kept";
+        std::filesystem::rename(workplace_.path(), kept);
+        std::cout << "The workplace is kept in " << kept << '\n';
+    }
     /// Has a worker repeat what the last one was killed in, and kills it in `operation`.
     void killIn(const std::string &operation)
     {
@@ -54,37 +66,42 @@ class Crash : public GitTest
         const auto longest = static_cast<std::size_t>(timeOf(operation).count());
         worker.killAfter(microseconds(random_.below(longest)));
         remember(worker);
-        const std::string interrupted = worker.interrupted();
-        ++(interrupted.empty() ? outside_[operation] : inside_[interrupted]);
+        interrupted_ = worker.interrupted();
+        ++(interrupted_.empty() ? outside_[operation] : inside_[interrupted_]);
         last_ = operation;
     }
     void recover()
     {
         workplace_.expectNothingLost(commits_, pushed_);
-        locks_ += workplace_.removeLocks();
-        merges_ += workplace_.abortMerge() ? 1U : 0U;
+        if (workplace_.removeLocks() != 0)
+            ++locked_[interrupted_];
+        if (workplace_.abortMerge())
+            ++merging_[interrupted_];
         Comparison(workplace_.repository(), random_.below(1U << 30)).compareAll();
     }
     void report() const
     {
         for (const auto &operation : operations)
         {
-            const auto count = [&](const std::map<std::string, std::size_t> &kills)
+            const auto count = [&](const Counts &kills)
             { return kills.count(operation) == 0 ? std::size_t{0} : kills.at(operation); };
-            std::cout << operation << ": killed inside " << count(inside_) << ", after the end "
-                      << count(outside_) << ", a run took " << timeOf(operation).count() << " us\n";
+            std::cout << operation << ": killed inside " << count(inside_)
+                      << ", of these left a lock " << count(locked_) << ", a merge "
+                      << count(merging_) << "; after the end " << count(outside_) << "; a run took "
+                      << timeOf(operation).count() << " us\n";
         }
-        std::cout << commits_.size() << " commits kept, " << locks_ << " locks removed, " << merges_
-                  << " merges aborted\n";
+        std::cout << sumOf(inside_) + sumOf(outside_) << " kills, " << sumOf(inside_)
+                  << " of them inside; " << commits_.size() << " commits kept, " << sumOf(locked_)
+                  << " times locks removed, " << sumOf(merging_) << " merges aborted\n";
     }
-    std::size_t inside() const
+    static std::size_t sumOf(const Counts &counts)
     {
         std::size_t sum = 0;
-        for (const auto &[operation, count] : inside_)
+        for (const auto &[operation, count] : counts)
             sum += count;
         return sum;
     }
-    const std::map<std::string, std::size_t> &killsInside() const
+    const Counts &killsInside() const
     {
         return inside_;
     }
@@ -116,13 +133,15 @@ class Crash : public GitTest
     Workplace workplace_{folder() / "workplace", environment().home()};
     Random random_{numberFrom("VCLINK_SEED", 1)};
     std::string last_ = "commit";
+    std::string interrupted_;
     std::map<std::string, microseconds> times_;
-    std::map<std::string, std::size_t> inside_;
-    std::map<std::string, std::size_t> outside_;
+    Counts inside_;
+    Counts outside_;
+    /// Kills inside that left a lock, and a merge under way.
+    Counts locked_;
+    Counts merging_;
     std::set<std::string> commits_;
     std::set<std::string> pushed_;
-    std::size_t locks_ = 0;
-    std::size_t merges_ = 0;
 };
 
 TEST_F(Crash, LosesNothingAndTheNextOperationWorks)
@@ -142,7 +161,7 @@ TEST_F(Crash, LosesNothingAndTheNextOperationWorks)
     }
     report();
     // Else it proves nothing.
-    EXPECT_GE(inside() * 2, kills);
+    EXPECT_GE(sumOf(killsInside()) * 2, kills);
     for (const auto &operation : operations)
         EXPECT_EQ(killsInside().count(operation), 1U) << "no kill fell into " << operation;
 }
