@@ -14,6 +14,7 @@
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
+#include <sys/wait.h>
 
 #include "../differential/expectedStates.hpp"
 #include "../differential/moves.hpp"
@@ -113,11 +114,16 @@ class FailingFileCall : public vclink::test::FaultTest
         std::string function;
         {
             const vclink::test::NothingLeft nothingLeft(environment().temporary());
-            const vclink::test::LibGit2Faults noting;
-            const FailingFiles failing(call, error);
-            outcome = outcomeOf(action);
-            function = failing.failed();
-            EXPECT_EQ(noting.openHandles(), std::vector<std::string>());
+            {
+                const vclink::test::LibGit2Faults noting;
+                const FailingFiles failing(call, error);
+                outcome = outcomeOf(action);
+                function = failing.failed();
+                EXPECT_EQ(noting.openHandles(), std::vector<std::string>());
+            }
+            trial_.closeWhatLibGit2Leaves();
+            if (GetParam().name == "mergeByTool")
+                reapTool();
         }
         SCOPED_TRACE("call " + std::to_string(call) + ", " + function + ": " +
                      std::strerror(error) + ": " + outcome);
@@ -135,7 +141,19 @@ class FailingFileCall : public vclink::test::FaultTest
         trial_.expectWorksAgain(action);
     }
 
+    /// Boost.Process does not say which child it has made where it can't read whether the command
+    /// has started; what can't be told from somebody else's child is left.
+    void reapTool()
+    {
+        while (vclink::test::hasChildren())
+        {
+            ASSERT_GT(::waitpid(-1, nullptr, 0), 0);
+            ++toolsLeft_;
+        }
+    }
+
     std::map<std::string, int> ends_;
+    std::size_t toolsLeft_ = 0;
 };
 
 TEST_P(FailingFileCall, LeavesTheRepositoryInOrder)
@@ -146,6 +164,7 @@ TEST_P(FailingFileCall, LeavesTheRepositoryInOrder)
         for (const int call : chooseCalls(count, error))
             fail(call, error);
     }
+    EXPECT_LE(toolsLeft_, 3 * errors.size());
     std::cout << "calls of the file system: " << count;
     for (const auto &[end, runs] : ends_)
         std::cout << "; " << runs << " runs ended " << end;

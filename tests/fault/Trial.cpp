@@ -5,9 +5,12 @@
 #include <cstdlib>
 #include <filesystem>
 #include <utility>
+#include <vector>
 
 #include <gtest/gtest.h>
+#include <unistd.h>
 
+#include "support/Descriptors.hpp"
 #include "support/text.hpp"
 
 namespace vclink::test
@@ -101,19 +104,47 @@ void Trial::expectSound() const
     }
     for (const auto &entry : fs::recursive_directory_iterator(folder_ / "subject"))
     {
-        // libgit2 keeps these where a fetch, or a merge with conflicts, fails in the midst of
-        // writing; git has no use for them.
-        const fs::path name = entry.path().filename();
-        if (name != "FETCH_HEAD.lock" && name != "MERGE_MSG.lock")
+        if (!isLeftByLibGit2(entry.path()))
         {
             EXPECT_NE(entry.path().extension(), ".lock") << entry.path();
         }
     }
 }
 
+bool Trial::isLeftByLibGit2(const fs::path &file) const
+{
+    const fs::path name = file.filename();
+    const bool isFileInConflict = begins(operation_.name, "merge") &&
+                                  file.parent_path() == repository_.path() &&
+                                  name.extension() == ".lock";
+    return name == "FETCH_HEAD.lock" || name == "MERGE_MSG.lock" || isFileInConflict;
+}
+
+void Trial::closeWhatLibGit2Leaves() const
+{
+    for (const auto &[descriptor, file] : openDescriptors())
+    {
+        if (isLeftByLibGit2(file))
+            ::close(descriptor);
+    }
+}
+
+void Trial::removeWhatLibGit2Leaves() const
+{
+    std::vector<fs::path> left;
+    for (const auto &entry : fs::recursive_directory_iterator(folder_ / "subject"))
+    {
+        // A fetch works over this one.
+        if (isLeftByLibGit2(entry.path()) && entry.path().filename() != "FETCH_HEAD.lock")
+            left.push_back(entry.path());
+    }
+    for (const auto &file : left)
+        fs::remove(file);
+}
+
 void Trial::expectWorksAgain(const Action &action) const
 {
-    fs::remove(repository_ / ".git/MERGE_MSG.lock");
+    removeWhatLibGit2Leaves();
     std::string outcome = outcomeOf(action);
     if (isDone(outcome) || outcome == normalOutcome_)
         return;

@@ -56,7 +56,15 @@ class Trial
     /// first call left something behind, after git has cleared it away.
     void expectWorksAgain(const Action &action) const;
 
+    /// Closes the descriptors of such locks as libgit2 leaves behind.
+    void closeWhatLibGit2Leaves() const;
+
   private:
+    /// Whether libgit2 forgets this lock where a call below it fails in the midst of writing:
+    /// FETCH_HEAD's, MERGE_MSG's, and that of a file in conflict, which it leaves open besides.
+    bool isLeftByLibGit2(const std::filesystem::path &file) const;
+    void removeWhatLibGit2Leaves() const;
+
     const Operation &operation_;
     std::filesystem::path folder_;
     std::filesystem::path home_;
