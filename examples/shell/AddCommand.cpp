@@ -5,10 +5,10 @@
 
 #include "Output.hpp"
 #include "Session.hpp"
+#include "arguments.hpp"
 #include "commands.hpp"
 #include "links.hpp"
 #include "namedPaths.hpp"
-#include "pathArguments.hpp"
 #include "refusals.hpp"
 #include "states.hpp"
 
@@ -23,12 +23,13 @@ class AddCommand : public Command
     void declare(CLI::App &line) override
     {
         paths_ = declarePaths(line, "New files, and folders: all new files below them")->required();
-        line.footer(
-            "The files are in the next commit. Ignored files are left out below a folder, and "
-            "refused by\nname. So is a file that Git tracks already: its changes are in the "
-            "next commit anyway, see\ncommit. When one is refused, nothing is added. A symbolic "
-            "link "
-            "that leads somewhere can't be\nadded: it would be followed.");
+        line.footer("The files are in the next commit. Ignored files are left out below a folder, "
+                    "and refused by\n"
+                    "name. So is a file that Git tracks already: its changes are in the next "
+                    "commit anyway, see\n"
+                    "commit. When one is refused, nothing is added. A symbolic link that leads "
+                    "somewhere can't be\n"
+                    "added: it would be followed.");
     }
 
     ExitStatus run(Session &session) override

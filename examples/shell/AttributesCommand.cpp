@@ -7,10 +7,10 @@
 
 #include "Output.hpp"
 #include "Session.hpp"
+#include "arguments.hpp"
 #include "commands.hpp"
 #include "failures.hpp"
 #include "fl/i18n/convert.hpp"
-#include "nameArgument.hpp"
 #include "names.hpp"
 #include "vclink/git/GitAttributes.hpp"
 
@@ -48,8 +48,8 @@ class AttributesCommand : public Command
         path_ = declareName(line, "PATH", "A file, which need not exist")->required();
         names_ = declareNames(line, "NAME", "Attributes")->required();
         line.footer("One line for each attribute, as it would stand in a .gitattributes file: "
-                    "\"NAME\", \"-NAME\",\n\"NAME=VALUE\", or \"!NAME\" where it is not "
-                    "specified.");
+                    "\"NAME\", \"-NAME\",\n"
+                    "\"NAME=VALUE\", or \"!NAME\" where it is not specified.");
     }
 
     ExitStatus run(Session &session) override

@@ -5,8 +5,8 @@
 
 #include "Output.hpp"
 #include "Session.hpp"
+#include "arguments.hpp"
 #include "commands.hpp"
-#include "nameArgument.hpp"
 #include "vclink/git/BranchManager.hpp"
 
 namespace vclink::shell

@@ -7,9 +7,9 @@
 
 #include "Output.hpp"
 #include "Session.hpp"
+#include "arguments.hpp"
 #include "commands.hpp"
 #include "fl/i18n/convert.hpp"
-#include "nameArgument.hpp"
 #include "names.hpp"
 #include "runWithRemote.hpp"
 

@@ -10,7 +10,6 @@
 #include "failures.hpp"
 #include "fl/i18n/convert.hpp"
 #include "namedPaths.hpp"
-#include "names.hpp"
 #include "refusals.hpp"
 #include "states.hpp"
 #include "unfinished.hpp"
@@ -23,15 +22,12 @@ namespace
 /// @throws ShellFailure when there are any
 void refuseConflicts(const FileStateMap &states, const upath &root)
 {
-    std::string names;
-    for (const auto &[path, state] : filter(states, isInConflict))
-    {
-        names += "\n  " + quoteName(relativeName(path, root));
-    }
-    if (!names.empty())
+    const FileStateMap conflicts = filter(states, isInConflict);
+    if (!conflicts.empty())
     {
         throw ShellFailure(
-            "Nothing was committed, because these files are in conflict:" + names +
+            "Nothing was committed, because these files are in conflict:" +
+            listNames(conflicts, root) +
             "\nMake each as it should be, and mark it with \"vclink-shell resolved\". "
             "With --as-is the commit\ntakes them as they stand, with any conflict "
             "markers.");
@@ -52,11 +48,12 @@ class CommitCommand : public Command
         line.add_flag("--as-is", takesAll_,
                       "Commit files in conflict as they stand, markers included, and in the midst\n"
                       "of a rebase, a bisection or a series of picked commits, which ends it");
-        line.footer(
-            "All changes to tracked files are in the commit, staged or not, and what was added "
-            "or removed.\nA merge that is under way is ended by it. The identity is that of "
-            "git's settings user.name and\nuser.email; where they are not set, it is made "
-            "from USER or LOGNAME and the name of the host.");
+        line.footer("All changes to tracked files are in the commit, staged or not, and what was "
+                    "added or removed.\n"
+                    "A merge that is under way is ended by it. The identity is that of git's "
+                    "settings user.name and\n"
+                    "user.email; where they are not set, it is made from USER or LOGNAME and the "
+                    "name of the host.");
     }
 
     ExitStatus run(Session &session) override

@@ -24,12 +24,14 @@ class ConfigCommand : public Command
     {
         line.add_flag("--write", writes_,
                       "Install the tools that come along, over what stands there");
-        line.footer(
-            "Shows the merge and diff tools in Git's configuration of this user. One line for each "
-            "that is set:\nits key, a tab, and its value. A file is merged by the automatic "
-            "tool when the attribute \"merge\"\ngives it \"vkAutoMerge\"; git mergetool and "
-            "git difftool run the others when they are told\n\"--tool=vkMerge\" and "
-            "\"--tool=vkDiff\". The file goes to standard error, if that is a terminal.");
+        line.footer("Shows the merge and diff tools in Git's configuration of this user. One line "
+                    "for each that is set:\n"
+                    "its key, a tab, and its value. A file is merged by the automatic tool when "
+                    "the attribute \"merge\"\n"
+                    "gives it \"vkAutoMerge\"; git mergetool and git difftool run the others when "
+                    "they are told\n"
+                    "\"--tool=vkMerge\" and \"--tool=vkDiff\". The file goes to standard error, if "
+                    "that is a terminal.");
     }
 
     ExitStatus run(Session &session) override

@@ -5,8 +5,8 @@
 
 #include "Output.hpp"
 #include "Session.hpp"
+#include "arguments.hpp"
 #include "commands.hpp"
-#include "nameArgument.hpp"
 #include "remotes.hpp"
 #include "runWithRemote.hpp"
 

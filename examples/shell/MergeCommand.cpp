@@ -8,11 +8,10 @@
 #include "Output.hpp"
 #include "ProgressLine.hpp"
 #include "Session.hpp"
+#include "arguments.hpp"
 #include "commands.hpp"
 #include "failures.hpp"
-#include "nameArgument.hpp"
 #include "namedPaths.hpp"
-#include "names.hpp"
 #include "revisions.hpp"
 #include "runStoppable.hpp"
 #include "states.hpp"
@@ -38,16 +37,6 @@ bool isPutBack(FileState::State state)
            state == FileState::Unknown;
 }
 
-std::string listNames(const FileStateMap &states, const upath &root)
-{
-    std::string names;
-    for (const auto &[path, state] : states)
-    {
-        names += "\n  " + quoteName(relativeName(path, root));
-    }
-    return names;
-}
-
 class MergeCommand : public Command
 {
   public:
@@ -59,16 +48,16 @@ class MergeCommand : public Command
         line.add_flag("--force", loses_,
                       "Merge over modified and missing files, which may be put back as they are\n"
                       "in the last commit");
-        line.footer(
-            "Brings the changes of another branch into the current one. Tells what came of it: "
-            "\"Already "
-            "up to\ndate.\", a fast-forward, or a merge commit. Files that are given to a merge "
-            "driver by the attribute\n\"merge\" are merged by it; see config for the tool that "
-            "comes along.\n\n"
-            "After conflicts the files in conflict are named, and the status is 1. Make each as it "
-            "should be,\nmark it with resolved, and conclude the merge with commit.\n\n"
-            "Ctrl-C stops it, as long as it still looks for what is to be written: nothing has "
-            "changed then.");
+        line.footer("Brings the changes of another branch into the current one. Tells what came of "
+                    "it: \"Already up to\n"
+                    "date.\", a fast-forward, or a merge commit. Files that are given to a merge "
+                    "driver by the attribute\n"
+                    "\"merge\" are merged by it; see config for the tool that comes along.\n\n"
+                    "After conflicts the files in conflict are named, and the status is 1. Make "
+                    "each as it should be,\n"
+                    "mark it with resolved, and conclude the merge with commit.\n\n"
+                    "Ctrl-C stops it, as long as it still looks for what is to be written: nothing "
+                    "has changed then.");
     }
 
     ExitStatus run(Session &session) override

@@ -5,9 +5,9 @@
 
 #include "Output.hpp"
 #include "Session.hpp"
+#include "arguments.hpp"
 #include "commands.hpp"
 #include "failures.hpp"
-#include "nameArgument.hpp"
 #include "remotes.hpp"
 #include "runWithRemote.hpp"
 
@@ -27,13 +27,14 @@ class PushCommand : public Command
                                  "refs/heads/mine:refs/heads/main; with nothing before the colon "
                                  "it is\ndeleted there, with a plus in front it may lose commits "
                                  "there");
-        line.footer(
-            "Sends commits to the remote, and moves its branches or tags. Without any REFSPEC, "
-            "what "
-            "the setting\nremote.REMOTE.push says. A server may reject some and take others: "
-            "those that it rejects are named\nwith its reason, and the status is 1.\n\n"
-            "Nobody is asked anything, see clone. Ctrl-C can stop it only as long as the server "
-            "sends something\nto be read; where it is silent, as with clone.");
+        line.footer("Sends commits to the remote, and moves its branches or tags. Without any "
+                    "REFSPEC, what the setting\n"
+                    "remote.REMOTE.push says. A server may reject some and take others: those that "
+                    "it rejects are named\n"
+                    "with its reason, and the status is 1.\n\n"
+                    "Nobody is asked anything, see clone. Ctrl-C can stop it only as long as the "
+                    "server sends something\n"
+                    "to be read; where it is silent, as with clone.");
     }
 
     ExitStatus run(Session &session) override

@@ -6,11 +6,11 @@
 
 #include "Output.hpp"
 #include "Session.hpp"
+#include "arguments.hpp"
 #include "commands.hpp"
 #include "folderCover.hpp"
 #include "links.hpp"
 #include "namedPaths.hpp"
-#include "pathArguments.hpp"
 #include "refusals.hpp"
 #include "states.hpp"
 
@@ -27,13 +27,14 @@ class RemoveCommand : public Command
         paths_ = declarePaths(line, "Tracked files, and folders: all tracked files below them")
                      ->required();
         line.footer(
-            "The files are gone in the next commit, and Git tracks them no longer. They stay "
-            "on the disk. A\nname that no tracked file has is refused, and nothing is "
-            "removed then. Files that are removed\nalready are passed over; when there are no "
-            "others, that is an error. Below a folder\nfiles are removed too that a sparse "
-            "checkout "
-            "leaves out. A symbolic link that leads somewhere can't\nbe removed: it would be "
-            "followed.");
+            "The files are gone in the next commit, and Git tracks them no longer. They stay on "
+            "the disk. A\n"
+            "name that no tracked file has is refused, and nothing is removed then. Files that are "
+            "removed\n"
+            "already are passed over; when there are no others, that is an error. Below a folder\n"
+            "files are removed too that a sparse checkout leaves out. A symbolic link that leads "
+            "somewhere can't\n"
+            "be removed: it would be followed.");
     }
 
     ExitStatus run(Session &session) override

@@ -9,11 +9,11 @@
 
 #include "Output.hpp"
 #include "Session.hpp"
+#include "arguments.hpp"
 #include "commands.hpp"
 #include "links.hpp"
 #include "namedPaths.hpp"
 #include "names.hpp"
-#include "pathArguments.hpp"
 #include "refusals.hpp"
 #include "states.hpp"
 
@@ -30,10 +30,11 @@ class ResolvedCommand : public Command
         path_ = declarePaths(line, "A file, or a folder: all files in conflict below it")
                     ->required()
                     ->expected(1);
-        line.footer(
-            "Takes the file as it now stands for the solution of its conflict; where it is gone "
-            "from the\ndisk, that is the solution. Its text is not looked at. A file that is "
-            "in no conflict is staged\nas it stands. Symbolic links are refused.");
+        line.footer("Takes the file as it now stands for the solution of its conflict; where it is "
+                    "gone from the\n"
+                    "disk, that is the solution. Its text is not looked at. A file that is in no "
+                    "conflict is staged\n"
+                    "as it stands. Symbolic links are refused.");
     }
 
     ExitStatus run(Session &session) override

@@ -5,10 +5,10 @@
 
 #include "Output.hpp"
 #include "Session.hpp"
+#include "arguments.hpp"
 #include "commands.hpp"
 #include "folderCover.hpp"
 #include "namedPaths.hpp"
-#include "pathArguments.hpp"
 #include "refusals.hpp"
 #include "runStoppable.hpp"
 #include "states.hpp"
@@ -26,15 +26,18 @@ class RevertCommand : public Command
         paths_ = declarePaths(line, "Tracked files, and folders: all tracked files below them")
                      ->required();
         line.footer(
-            "Throws away all changes to the files, staged or not: they are as in the last "
-            "commit, and back\non the disk where they were gone. A file that was only added "
-            "is new again, and keeps its text.\nOther new files are left alone below a "
-            "folder, and refused by name. While one of the files is in\na conflict, nothing "
-            "is reverted. A symbolic link is put back itself, not what it leads to. Below\na "
-            "folder, files that a sparse checkout leaves out are written too.\n\n"
-            "Ctrl-C stops it, as long as it still looks for what is to be written. What has "
-            "been staged may\nbe reset then, and the files are as they were. Run it again, "
-            "or go on working.");
+            "Throws away all changes to the files, staged or not: they are as in the last commit, "
+            "and back\n"
+            "on the disk where they were gone. A file that was only added is new again, and keeps "
+            "its text.\n"
+            "Other new files are left alone below a folder, and refused by name. While one of the "
+            "files is in\n"
+            "a conflict, nothing is reverted. A symbolic link is put back itself, not what it "
+            "leads to. Below\n"
+            "a folder, files that a sparse checkout leaves out are written too.\n\n"
+            "Ctrl-C stops it, as long as it still looks for what is to be written. What has been "
+            "staged may\n"
+            "be reset then, and the files are as they were. Run it again, or go on working.");
     }
 
     ExitStatus run(Session &session) override

@@ -16,9 +16,9 @@ class StateCommand : public Command
   public:
     void declare(CLI::App &line) override
     {
-        line.footer(
-            "\"Normal\", or the operation that is not finished: \"Conflicts\" is a merge, a "
-            "revert or a\ncherry-pick, also when no file is in conflict.");
+        line.footer("\"Normal\", or the operation that is not finished: \"Conflicts\" is a merge, "
+                    "a revert or a\n"
+                    "cherry-pick, also when no file is in conflict.");
     }
 
     ExitStatus run(Session &session) override

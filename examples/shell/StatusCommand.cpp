@@ -4,11 +4,11 @@
 
 #include "Output.hpp"
 #include "Session.hpp"
+#include "arguments.hpp"
 #include "commands.hpp"
 #include "fl/i18n/convert.hpp"
 #include "namedPaths.hpp"
 #include "names.hpp"
-#include "pathArguments.hpp"
 #include "states.hpp"
 
 namespace vclink::shell

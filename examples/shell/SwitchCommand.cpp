@@ -6,9 +6,9 @@
 
 #include "Output.hpp"
 #include "Session.hpp"
+#include "arguments.hpp"
 #include "commands.hpp"
 #include "failures.hpp"
-#include "nameArgument.hpp"
 #include "revisions.hpp"
 #include "runStoppable.hpp"
 

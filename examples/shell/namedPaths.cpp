@@ -163,6 +163,16 @@ FileStateMap filter(const FileStateMap &states,
     return meant;
 }
 
+std::string listNames(const FileStateMap &states, const upath &root)
+{
+    std::string names;
+    for (const auto &[path, state] : states)
+    {
+        names += "\n  " + quoteName(relativeName(path, root));
+    }
+    return names;
+}
+
 std::vector<upath> addressable(const FileStateMap &states, const upath &root)
 {
     std::vector<upath> paths;

@@ -55,6 +55,10 @@ upath canonicalForm(const upath &path);
 FileStateMap filter(const FileStateMap &states,
                     const std::function<bool(FileState::State)> &isMeant);
 
+/// For a message: each file by its name relative to the root, on an indented line of its own that a
+/// line feed begins.
+std::string listNames(const FileStateMap &states, const upath &root);
+
 /// The files that the back end can be told of by their names.
 std::vector<upath> addressable(const FileStateMap &states, const upath &root);
 

@@ -95,14 +95,9 @@ void refuseStrays(const std::string &refusal, CMAdapter &adapter,
     }
     if (!strays.empty())
     {
-        std::string names;
-        for (const auto &[path, state] : strays)
-        {
-            names += "\n  " + quoteName(relativeName(path, root));
-        }
-        throw ShellFailure(
-            refusal + ". A name with *, ? or [ is a pattern, and means these files too:" + names +
-            "\nName them as well, if they are meant.");
+        throw ShellFailure(refusal +
+                           ". A name with *, ? or [ is a pattern, and means these files too:" +
+                           listNames(strays, root) + "\nName them as well, if they are meant.");
     }
 }
 
@@ -151,21 +146,21 @@ FileStateMap findLeftOut(CMAdapter &adapter, const FileStateMap &files,
 ExitStatus tellLeftOut(const std::string &refusal, const upath &root, const FileStateMap &leftOut)
 {
     // In the order in which they are told.
-    std::string unnamable;
-    std::string followed;
-    std::string others;
-    for (const auto &[path, state] : leftOut)
+    FileStateMap unnamable;
+    FileStateMap followed;
+    FileStateMap others;
+    for (const auto &entry : leftOut)
     {
-        std::string &names = !isAddressable(path, root) ? unnamable
-                             : isFollowed(path, root)   ? followed
-                                                        : others;
-        names += "\n  " + quoteName(relativeName(path, root));
+        FileStateMap &files = !isAddressable(entry.first, root) ? unnamable
+                              : isFollowed(entry.first, root)   ? followed
+                                                                : others;
+        files.insert(files.end(), entry);
     }
-    const auto tell = [&refusal](const std::string &reason, const std::string &names)
+    const auto tell = [&](const std::string &reason, const FileStateMap &files)
     {
-        if (!names.empty())
+        if (!files.empty())
         {
-            complain(refusal + reason + names);
+            complain(refusal + reason + listNames(files, root));
         }
     };
     tell(", as a backslash in a name is taken for a slash:", unnamable);

@@ -5,8 +5,8 @@
 #include <string>
 
 #include "Session.hpp"
+#include "arguments.hpp"
 #include "fl/i18n/convert.hpp"
-#include "nameArgument.hpp"
 #include "names.hpp"
 
 namespace vclink::shell

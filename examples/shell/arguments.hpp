@@ -6,19 +6,20 @@
 
 #include <CLI/CLI.hpp>
 
+/// The arguments of commands. They are read with CLI::Option::results(), which has them as given:
+/// in the conversion to a list some versions of CLI11 take "{}" for an empty one. None may be
+/// empty.
 namespace vclink::shell
 {
 
-/// Lets no empty argument through.
 inline CLI::Option *refuseEmpty(CLI::Option *option)
 {
     return option->type_name("")->check(
-        [](const std::string &name)
-        { return name.empty() ? std::string("it may not be empty") : std::string(); });
+        [](const std::string &argument)
+        { return argument.empty() ? std::string("it may not be empty") : std::string(); });
 }
 
-/// Declares one name, of a branch, a revision or a file, at this place of a command's line. It is
-/// read as the paths of declarePaths() are.
+/// Declares one name, of a branch, a revision or a file, at this place of a command's line.
 inline CLI::Option *declareName(CLI::App &line, const std::string &label,
                                 const std::string &description)
 {
@@ -32,6 +33,12 @@ inline CLI::Option *declareNames(CLI::App &line, const std::string &label,
 {
     return refuseEmpty(line.add_option_function<std::vector<std::string>>(
         label, [](const std::vector<std::string> & /*names*/) {}, description));
+}
+
+/// Declares any number of paths at the end of a command's line.
+inline CLI::Option *declarePaths(CLI::App &line, const std::string &description)
+{
+    return declareNames(line, "PATH", description);
 }
 
 } // namespace vclink::shell
