@@ -165,9 +165,12 @@ class Workplace:
     def _build(self, target, jobs):
         # A program that is linked is not run by this: see the preset.
         command = ["ninja", f"-j{jobs}", target]
-        status, output = sandbox.run(
-            command, self.tree, self.build, BUILD_SECONDS, writable=self.tree
-        )
+        try:
+            status, output = sandbox.run(
+                command, self.tree, self.build, BUILD_SECONDS, writable=self.tree
+            )
+        except sandbox.TimeLimit as limit:
+            raise DoesNotCompile("in time") from limit
         if status != 0:
             raise DoesNotCompile(output)
 
