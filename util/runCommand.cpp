@@ -135,6 +135,9 @@ int runCommand(const std::string &commandTemplate,
     StartGuard guard(output.pipe().native_source(), output.pipe().native_sink());
     process::child child(command, process::std_out > output, process::std_err > process::null,
                          boost::this_process::environment());
+    // Where the process can't be forked, Boost.Process raises nothing and gives no child, whose
+    // number would mean every child of the process.
+    raiseIfError(child.valid() ? std::error_code() : lastError(), "fork(2) failed");
     guard.hasStarted(child.id());
     ChildStatus status(child.id());
     writeRecord(SeverityDiagnostic, "Output:\n", readOutput(output, status));

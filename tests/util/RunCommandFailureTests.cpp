@@ -10,12 +10,14 @@
 
 #include <fcntl.h>
 #include <gtest/gtest.h>
+#include <sys/resource.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
 #include "DescriptorLimit.hpp"
 #include "RunCommandTest.hpp"
 #include "support/LogCapture.hpp"
+#include "support/UnprivilegedUser.hpp"
 #include "util/processError.hpp"
 #include "util/runCommand.hpp"
 
@@ -159,6 +161,34 @@ TEST_F(RunCommandFailure, LeavesTheOtherChildrenOfTheProcess)
     int status = 0;
     EXPECT_EQ(::waitpid(child, &status, WNOHANG), child);
     EXPECT_EQ(WEXITSTATUS(status), 9);
+}
+
+/// In a process that has a child and can't make another one.
+std::string runWithoutAnotherProcess()
+{
+    const pid_t child = ::fork();
+    if (child == 0)
+        ::_exit(9);
+    siginfo_t info = {};
+    ::waitid(P_PID, static_cast<id_t>(child), &info, WEXITED | WNOWAIT);
+    const rlimit none{0, 0};
+    ::setrlimit(RLIMIT_NPROC, &none);
+    try
+    {
+        runCommand("/bin/true", {});
+        return "nothing was raised";
+    }
+    catch (const boost::process::process_error &error)
+    {
+        if (error.code().value() != EAGAIN)
+            return error.what();
+    }
+    return ::waitpid(child, nullptr, WNOHANG) == child ? "" : "the other child is gone";
+}
+
+TEST_F(RunCommandFailure, OfTheForkIsAnErrorAndLeavesTheOtherChildren)
+{
+    EXPECT_EQ(vclink::test::runAsUnprivilegedUser(runWithoutAnotherProcess), "");
 }
 
 TEST_F(RunCommandFailure, OfThePipeIsAnErrorWithoutARecord)
