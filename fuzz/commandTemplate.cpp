@@ -4,7 +4,13 @@
 #include <algorithm>
 #include <map>
 
+// As where the library runs commands.
+#if __has_include(<boost/process/v1/detail/posix/basic_cmd.hpp>)
+#define BOOST_PROCESS_VERSION 1
+#include <boost/process/v1/detail/posix/basic_cmd.hpp>
+#else
 #include <boost/process/detail/posix/basic_cmd.hpp>
+#endif
 
 #include "check.hpp"
 #include "util/commandLine.hpp"
