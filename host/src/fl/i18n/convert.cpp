@@ -2,6 +2,7 @@
 #include "fl/i18n/convert.hpp"
 
 #include <array>
+#include <cstddef>
 #include <cstdint>
 #include <cstring>
 #include <string_view>
@@ -101,36 +102,55 @@ template <class Unit> constexpr bool isAscii(Unit unit) noexcept
     return static_cast<std::make_unsigned_t<Unit>>(unit) < 0x80;
 }
 
-/// Widens four bytes; false, and nothing written, when one of them is not ASCII. Each byte is
-/// spread to its own unit, which holds for either order of bytes.
-bool copyFourAscii(const char *from, char16_t *to) noexcept
+/// The bits that no unit of an ASCII text has, of as many units as go into a word.
+template <class Unit>
+constexpr std::uint64_t notAscii = sizeof(Unit) == 1 ? 0x8080808080808080U : 0xFF80FF80FF80FF80U;
+
+/// Copies so many units; false, and nothing written, when one of them is not ASCII. The copies to
+/// and from arrays let the compiler take the units all at once: a plain `char` might alias
+/// anything.
+template <std::size_t count, class To, class From>
+inline bool copyAscii(const From *from, To *to) noexcept
 {
-    std::uint32_t bytes = 0;
-    std::memcpy(&bytes, from, sizeof bytes);
-    if ((bytes & 0x80808080U) != 0)
+    std::array<From, count> units;
+    std::array<std::uint64_t, sizeof units / sizeof(std::uint64_t)> words;
+    std::memcpy(units.data(), from, sizeof units);
+    std::memcpy(words.data(), from, sizeof words);
+    std::uint64_t bits = 0;
+    for (const std::uint64_t word : words)
+    {
+        bits |= word;
+    }
+    if ((bits & notAscii<From>) != 0)
     {
         return false;
     }
-    std::uint64_t units = bytes;
-    units = (units | (units << 16U)) & 0x0000FFFF0000FFFFU;
-    units = (units | (units << 8U)) & 0x00FF00FF00FF00FFU;
-    std::memcpy(to, &units, sizeof units);
+    std::array<To, count> copied;
+    for (std::size_t index = 0; index != count; ++index)
+    {
+        copied[index] = static_cast<To>(units[index]);
+    }
+    std::memcpy(to, copied.data(), sizeof copied);
     return true;
 }
 
-/// The way back.
-bool copyFourAscii(const char16_t *from, char *to) noexcept
+/// Copies by blocks up to one with a unit that is not ASCII. What is left at the end and fills no
+/// block goes with a last block, which covers some of the one before again.
+/// @return how many were copied
+template <std::size_t count, class To, class From>
+std::size_t copyAsciiBlocks(const From *from, std::size_t size, To *to) noexcept
 {
-    std::uint64_t units = 0;
-    std::memcpy(&units, from, sizeof units);
-    if ((units & 0xFF80FF80FF80FF80U) != 0)
+    std::size_t copied = 0;
+    while (size - copied >= count)
     {
-        return false;
+        if (!copyAscii<count>(from + copied, to + copied))
+        {
+            return copied;
+        }
+        copied += count;
     }
-    units = (units | (units >> 8U)) & 0x0000FFFF0000FFFFU;
-    const auto bytes = static_cast<std::uint32_t>(units | (units >> 16U));
-    std::memcpy(to, &bytes, sizeof bytes);
-    return true;
+    const bool isCut = copied != 0 && copied != size;
+    return isCut && copyAscii<count>(from + size - count, to + size - count) ? size : copied;
 }
 
 /// Copies up to the first unit that is not ASCII. Nearly all texts are ASCII from end to end, and
@@ -139,17 +159,14 @@ bool copyFourAscii(const char16_t *from, char *to) noexcept
 template <class To, class From>
 std::size_t copyLeadingAscii(const From *begin, const From *end, To *out) noexcept
 {
-    const From *position = begin;
-    while (end - position >= 4 && copyFourAscii(position, out))
+    const auto size = static_cast<std::size_t>(end - begin);
+    std::size_t copied = copyAsciiBlocks<16>(begin, size, out);
+    copied += copyAsciiBlocks<8>(begin + copied, size - copied, out + copied);
+    for (; copied != size && isAscii(begin[copied]); ++copied)
     {
-        position += 4;
-        out += 4;
+        out[copied] = static_cast<To>(begin[copied]);
     }
-    for (; position != end && isAscii(*position); ++position)
-    {
-        *out++ = static_cast<To>(*position);
-    }
-    return static_cast<std::size_t>(position - begin);
+    return copied;
 }
 
 template <class To, class From> std::size_t measure(const From *begin, const From *end) noexcept
