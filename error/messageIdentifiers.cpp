@@ -4,8 +4,6 @@
 namespace shared_vclink::git
 {
 
-const char *const detail::catalogue = "shared_vclink:git";
-
 HasConflicts::HasConflicts() : BaseMsgID({}, detail::catalogue, "HasConflicts")
 {
 }

@@ -24,8 +24,7 @@ int CheckoutCallbacks::notifyProgress(git_checkout_notify_t why, const char *pat
                                       const git_diff_file * /*workdir*/)
 {
     poller_.throwIfCancelled();
-    const std::string pathStr = path != nullptr ? path : "";
-    writeRecord(SeverityProgress, "Checkout Notify : ", static_cast<unsigned>(why), " (", pathStr,
+    writeRecord(SeverityProgress, "Checkout Notify : ", static_cast<unsigned>(why), " (", path,
                 ")");
     return 0;
 }
@@ -34,15 +33,15 @@ void CheckoutCallbacks::checkoutProgress(const char *path, std::size_t completed
                                          std::size_t totalSteps)
 {
     ProgressReporter *const reporter = interactor_.getProgressReporter();
-    const std::string pathStr = path != nullptr ? path : "";
-    writeRecord(SeverityParameter, " pathStr=", pathStr, " completed_steps=", completedSteps,
+    const bool hasPath = path != nullptr && *path != '\0';
+    writeRecord(SeverityParameter, " pathStr=", path, " completed_steps=", completedSteps,
                 " total_steps=", totalSteps);
     if (completedSteps == 0)
     {
         // Once more below for a first step with a path, which is meant.
         reporter->setProgress(0.0);
     }
-    if (pathStr.empty() || totalSteps == 0)
+    if (!hasPath || totalSteps == 0)
     {
         return;
     }

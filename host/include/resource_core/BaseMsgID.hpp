@@ -2,6 +2,7 @@
 #pragma once
 
 #include <string>
+#include <utility>
 #include <vector>
 
 #include <boost/variant/variant.hpp>
@@ -20,15 +21,30 @@ class VCLINK_HOST_EXPORT BaseMsgID
 {
   public:
     BaseMsgID(std::vector<MsgArgument> arguments, std::string catalogue, std::string key);
+    /// The same, inline: a literal's length is known where it stands, and a message is made for
+    /// every file of a checkout.
+    BaseMsgID(std::vector<MsgArgument> arguments, const char *catalogue, const char *key)
+        : arguments_(std::move(arguments)), catalogue_(catalogue), key_(key)
+    {
+    }
     BaseMsgID(const BaseMsgID &) = default;
     BaseMsgID(BaseMsgID &&) noexcept = default;
     BaseMsgID &operator=(const BaseMsgID &) = default;
     BaseMsgID &operator=(BaseMsgID &&) noexcept = default;
     virtual ~BaseMsgID();
 
-    const std::vector<MsgArgument> &getArguments() const noexcept;
-    const std::string &getCatalogue() const noexcept;
-    const std::string &getKey() const noexcept;
+    const std::vector<MsgArgument> &getArguments() const noexcept
+    {
+        return arguments_;
+    }
+    const std::string &getCatalogue() const noexcept
+    {
+        return catalogue_;
+    }
+    const std::string &getKey() const noexcept
+    {
+        return key_;
+    }
 
   private:
     std::vector<MsgArgument> arguments_;

@@ -13,19 +13,4 @@ BaseMsgID::BaseMsgID(std::vector<MsgArgument> arguments, std::string catalogue, 
 
 BaseMsgID::~BaseMsgID() = default;
 
-const std::vector<MsgArgument> &BaseMsgID::getArguments() const noexcept
-{
-    return arguments_;
-}
-
-const std::string &BaseMsgID::getCatalogue() const noexcept
-{
-    return catalogue_;
-}
-
-const std::string &BaseMsgID::getKey() const noexcept
-{
-    return key_;
-}
-
 } // namespace resource_core

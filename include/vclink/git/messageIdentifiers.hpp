@@ -2,6 +2,7 @@
 #pragma once
 
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "fl/ustring.hpp"
@@ -17,33 +18,37 @@ namespace shared_vclink::git
 namespace detail
 {
 
-VCLINK_GIT_EXPORT extern const char *const catalogue;
+inline constexpr const char *catalogue = "shared_vclink:git";
 
-inline resource_core::MsgArgument makeArgument(long number)
+/// What a value becomes in a message.
+inline long toArgument(long number)
 {
     return number;
 }
-inline resource_core::MsgArgument makeArgument(const char *text)
-{
-    return std::string(text);
-}
-inline resource_core::MsgArgument makeArgument(const std::string &text)
+inline std::string toArgument(const char *text)
 {
     return text;
 }
-inline resource_core::MsgArgument makeArgument(const ustring &text)
+inline const std::string &toArgument(const std::string &text)
 {
     return text;
+}
+inline const ustring &toArgument(const ustring &text)
+{
+    return text;
+}
+inline ustring &&toArgument(ustring &&text)
+{
+    return std::move(text);
 }
 
-/// Without the copy that a list of initialisers makes: such a message goes with every file of a
+/// Without the copies that a list of initialisers makes: such a message goes with every file of a
 /// checkout.
-template <class... Values>
-std::vector<resource_core::MsgArgument> makeArguments(const Values &...values)
+template <class... Values> std::vector<resource_core::MsgArgument> makeArguments(Values &&...values)
 {
     std::vector<resource_core::MsgArgument> arguments;
     arguments.reserve(sizeof...(values));
-    (arguments.push_back(makeArgument(values)), ...);
+    (arguments.emplace_back(toArgument(std::forward<Values>(values))), ...);
     return arguments;
 }
 
@@ -176,6 +181,11 @@ class VCLINK_GIT_EXPORT ProgressCallbackCheckoutMessage : public resource_core::
     template <class Text>
     explicit ProgressCallbackCheckoutMessage(const Text &path)
         : BaseMsgID(detail::makeArguments(path), detail::catalogue,
+                    "ProgressCallbackCheckoutMessage")
+    {
+    }
+    explicit ProgressCallbackCheckoutMessage(ustring &&path)
+        : BaseMsgID(detail::makeArguments(std::move(path)), detail::catalogue,
                     "ProgressCallbackCheckoutMessage")
     {
     }

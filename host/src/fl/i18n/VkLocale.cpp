@@ -1,7 +1,10 @@
 // SPDX-License-Identifier: MIT
 #include "fl/i18n/VkLocale.hpp"
 
+#include <algorithm>
+#include <atomic>
 #include <cstdlib>
+#include <forward_list>
 #include <mutex>
 #include <utility>
 
@@ -25,10 +28,34 @@ VkLocale readEnvironment()
     return VkLocale();
 }
 
-struct GlobalLocale
+/// Read for each text that is shown, and seldom set: so that readers need no lock, a locale that
+/// was global once is kept, and found again when it is set again.
+class GlobalLocale
 {
-    std::mutex mutex;
-    VkLocale locale = readEnvironment();
+  public:
+    const VkLocale &get() const noexcept
+    {
+        return *current_.load(std::memory_order_acquire);
+    }
+
+    void set(const VkLocale &locale)
+    {
+        const std::lock_guard<std::mutex> lock(mutex_);
+        const auto known =
+            std::find_if(locales_.begin(), locales_.end(),
+                         [&locale](const VkLocale &each) { return each.name() == locale.name(); });
+        if (known == locales_.end())
+        {
+            locales_.push_front(locale);
+        }
+        current_.store(known == locales_.end() ? &locales_.front() : &*known,
+                       std::memory_order_release);
+    }
+
+  private:
+    std::mutex mutex_;
+    std::forward_list<VkLocale> locales_{readEnvironment()};
+    std::atomic<const VkLocale *> current_{&locales_.front()};
 };
 
 GlobalLocale &globalLocale()
@@ -45,9 +72,7 @@ VkLocale::VkLocale(std::string name) : name_(std::move(name))
 
 VkLocale VkLocale::global()
 {
-    GlobalLocale &global = globalLocale();
-    const std::lock_guard<std::mutex> lock(global.mutex);
-    return global.locale;
+    return globalLocale().get();
 }
 
 const std::string &VkLocale::name() const noexcept
@@ -62,9 +87,7 @@ namespace vclink_host
 
 void setGlobalLocale(const fl::i18n::VkLocale &locale)
 {
-    fl::i18n::GlobalLocale &global = fl::i18n::globalLocale();
-    const std::lock_guard<std::mutex> lock(global.mutex);
-    global.locale = locale;
+    fl::i18n::globalLocale().set(locale);
 }
 
 } // namespace vclink_host

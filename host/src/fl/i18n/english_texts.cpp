@@ -7,20 +7,24 @@
 
 // The template of the translations is extracted from this file, the key being the message's
 // context: see host/po/CMakeLists.txt.
-#define VCLINK_TEXT(key, text) (EnglishText{key, text})
+#define VCLINK_TEXT(key, text) (EnglishTextOfKey{key, {text, u"" text}})
 
 namespace fl::i18n
 {
 namespace
 {
 
-struct EnglishText
+struct EnglishTextOfKey
 {
     std::string_view key;
-    const char *text;
+    EnglishText text;
 };
 
-constexpr EnglishText texts[] = {
+// The first one is asked for with every file of a checkout.
+constexpr EnglishTextOfKey texts[] = {
+    VCLINK_TEXT("ProgressCallbackCheckoutMessage",
+                // TRANSLATORS: %1% is the path of one file.
+                "Checking out %1%"),
     VCLINK_TEXT("LibGit2Error",
                 // TRANSLATORS: %1% and %2% are numbers; %3% is Git's own explanation, always
                 // English, without a full stop.
@@ -53,19 +57,16 @@ constexpr EnglishText texts[] = {
     VCLINK_TEXT("InvalidGitAttributeValue",
                 // TRANSLATORS: %1% is the value as it stands in a .gitattributes file.
                 "\"%1%\" cannot be understood as the value of a Git attribute."),
-    VCLINK_TEXT("ProgressCallbackCheckoutMessage",
-                // TRANSLATORS: %1% is the path of one file.
-                "Checking out %1%"),
 };
 
 } // namespace
 
-const char *findEnglishText(const std::string &key) noexcept
+const EnglishText *findEnglishText(const std::string &key) noexcept
 {
-    const auto *const found =
-        std::find_if(std::begin(texts), std::end(texts),
-                     [&key](const EnglishText &text) { return key == text.key; });
-    return found == std::end(texts) ? nullptr : found->text;
+    const auto *const found = std::find_if(std::begin(texts), std::end(texts),
+                                           [&key](const EnglishTextOfKey &text)
+                                           { return text.key == std::string_view(key); });
+    return found == std::end(texts) ? nullptr : &found->text;
 }
 
 } // namespace fl::i18n

@@ -1,9 +1,11 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
-#include <string>
 #include <string_view>
 #include <vector>
+
+#include "fl/ustring.hpp"
+#include "resource_core/BaseMsgID.hpp"
 
 namespace fl::i18n
 {
@@ -12,6 +14,10 @@ namespace fl::i18n
 /// "%%" for a percent sign. Whatever a translator made of them, nothing is raised but
 /// std::bad_alloc: a placeholder without an argument becomes empty, an argument without a
 /// placeholder is left out, and a percent sign that means nothing stands for itself.
-std::string fillPlaceholders(std::string_view text, const std::vector<std::string> &arguments);
+ustring fillPlaceholders(std::u16string_view text,
+                         const std::vector<resource_core::MsgArgument> &arguments);
+
+/// A value as it stands in a text.
+void appendArgument(ustring &text, const resource_core::MsgArgument &argument);
 
 } // namespace fl::i18n

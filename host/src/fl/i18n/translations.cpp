@@ -6,6 +6,7 @@
 #include <map>
 #include <mutex>
 #include <new>
+#include <string_view>
 #include <tuple>
 
 #include <boost/locale/gnu_gettext.hpp>
@@ -61,7 +62,8 @@ std::string getInstalledCatalogues()
 /// Whether a locale has no translations by its name alone.
 bool isUntranslated(const std::string &name)
 {
-    return name.empty() || name == "C" || name == "POSIX" || name.compare(0, 2, "C.") == 0;
+    const bool isC = name[0] == 'C' && (name.size() == 1 || name[1] == '.');
+    return isC || name.empty() || name == "POSIX";
 }
 
 using Messages = boost::locale::message_format<char>;
@@ -126,25 +128,25 @@ Catalogues &catalogues()
 
 } // namespace
 
-std::string translate(const VkLocale &locale, const std::string &key, const char *english)
+const char *findTranslation(const VkLocale &locale, const std::string &key, const char *english)
 {
     if (isUntranslated(locale.name()))
     {
-        return english;
+        return nullptr;
     }
     const Language language = parseLocaleName(locale.name());
     if (language.language.empty())
     {
-        return english;
+        return nullptr;
     }
     const std::locale catalogue = catalogues().get(language);
     if (!std::has_facet<Messages>(catalogue))
     {
-        return english;
+        return nullptr;
     }
     const auto &messages = std::use_facet<Messages>(catalogue);
     const char *const translation = messages.get(messages.domain(domain), key.c_str(), english);
-    return translation != nullptr && *translation != '\0' ? translation : english;
+    return translation != nullptr && *translation != '\0' ? translation : nullptr;
 }
 
 } // namespace fl::i18n
