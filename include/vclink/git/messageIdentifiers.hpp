@@ -184,6 +184,7 @@ class VCLINK_GIT_EXPORT ProgressCallbackCheckoutMessage : public resource_core::
                     "ProgressCallbackCheckoutMessage")
     {
     }
+    /// @param path the file, relative to the root; it is moved from
     explicit ProgressCallbackCheckoutMessage(ustring &&path)
         : BaseMsgID(detail::makeArguments(std::move(path)), detail::catalogue,
                     "ProgressCallbackCheckoutMessage")
