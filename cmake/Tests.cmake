@@ -13,7 +13,9 @@ function(vclink_add_tests target)
         message(FATAL_ERROR "${target}: one label, not '${arg_LABEL};${arg_UNPARSED_ARGUMENTS}'")
     endif()
     add_executable(${target}
-        ${arg_SOURCES} ${PROJECT_SOURCE_DIR}/tests/support/leakSuppressions.cpp)
+        ${arg_SOURCES}
+        ${PROJECT_SOURCE_DIR}/tests/support/leakSuppressions.cpp
+        ${PROJECT_SOURCE_DIR}/tests/support/raceSuppressions.cpp)
     vclink_configure_target(${target})
     target_link_libraries(${target} PRIVATE
         vclink_git_objects vclink_test_support ${arg_LIBRARIES} GTest::gmock GTest::gtest_main)
