@@ -28,12 +28,14 @@ class Programs:
         pairs = (line.split() for line in done.stdout.splitlines())
         return {name: int(value) for name, value in pairs}
 
-    def instructions(self, program, *arguments):
-        """How many instructions callgrind counts in the region."""
+    def instructions(self, program, *arguments, displacement=0):
+        """How many instructions callgrind counts in the region, with the heap moved by so many
+        bytes."""
         name = "-".join([program, *arguments]).replace("/", "_")
         counts = os.path.join(self._scratch, f"callgrind{name}")
         self.run(program, *arguments, wrapper=[
-            "valgrind", "--tool=callgrind", "--instr-atstart=no", f"--callgrind-out-file={counts}"])
+            "valgrind", "--tool=callgrind", "--instr-atstart=no", f"--callgrind-out-file={counts}"],
+            env={**self._env, "VCLINK_BENCH_DISPLACEMENT": str(displacement)})
         with open(counts, encoding="utf-8") as file:
             totals = [line for line in file if line.startswith("totals:")]
         os.remove(counts)
