@@ -3,6 +3,7 @@
 
 import os
 import shutil
+import statistics
 
 import working_copies
 from daemon import Daemon
@@ -13,9 +14,9 @@ LIMIT = 1.03
 ROUNDS = 5
 # What a server sends comes in pieces of this size today and of that tomorrow, which costs a few
 # hundredths. And libgit2 compares each path with those in its buffers, which costs glibc more where
-# a buffer happens to lie near the end of a page: up to 6 thousandths of a clone. So the smallest of
-# so many counts is taken, each with the heap of both programs moved by so many bytes more.
-COUNTS = 4
+# a buffer happens to lie near the end of a page: up to 6 thousandths of a clone. So the median of so
+# many counts is taken, each with the heap of both programs moved by so many bytes more.
+COUNTS = 5
 DISPLACEMENT = 528
 CLONED = 10_000
 COMMITS = 1_000
@@ -129,7 +130,7 @@ class RemoteBench:
                 counts.append(self._programs.instructions(
                     f"remote_{program}", *operation.arguments(),
                     displacement=number * DISPLACEMENT))
-        return {program: min(counts) for program, counts in counted.items()}
+        return {program: statistics.median(counts) for program, counts in counted.items()}
 
     def clock(self):
         self._rounds = {operation.title: self._programs.clock(
