@@ -132,12 +132,9 @@ class BranchBench:
                 for operation in self._operations if not operation.driver}
 
     def _count(self, operation):
-        counted = {}
-        for program in ("floor", "library"):
-            operation.put_back()
-            counted[program] = self._programs.instructions(
-                f"branch_{program}", *operation.arguments)
-        return counted
+        return {program: self._programs.median_instructions(
+            f"branch_{program}", *operation.arguments, before=operation.put_back)
+            for program in ("floor", "library")}
 
     def clock(self):
         self._rounds = {}

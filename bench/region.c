@@ -17,7 +17,7 @@ static struct timespec started;
 static struct timespec ended;
 static void *displacement;
 
-/// Moves what the heap gives out within the region by so many bytes: see COUNTS in remotes.py.
+/// Moves what the heap gives out within the region by so many bytes: see COUNTS in programs.py.
 static void displaceHeap(void)
 {
     const char *const bytes = getenv("VCLINK_BENCH_DISPLACEMENT");

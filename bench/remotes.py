@@ -3,7 +3,6 @@
 
 import os
 import shutil
-import statistics
 
 import working_copies
 from daemon import Daemon
@@ -12,12 +11,6 @@ from report import Table
 
 LIMIT = 1.03
 ROUNDS = 5
-# What a server sends comes in pieces of this size today and of that tomorrow, which costs a few
-# hundredths. And libgit2 compares each path with those in its buffers, which costs glibc more where
-# a buffer happens to lie near the end of a page: up to 6 thousandths of a clone. So the median of so
-# many counts is taken, each with the heap of both programs moved by so many bytes more.
-COUNTS = 5
-DISPLACEMENT = 528
 CLONED = 10_000
 COMMITS = 1_000
 HEADS = 10_000
@@ -123,14 +116,10 @@ class RemoteBench:
                 for operation in self._operations}
 
     def _count(self, operation):
-        counted = {"floor": [], "library": []}
-        for number in range(COUNTS):
-            for program, counts in counted.items():
-                operation.put_back()
-                counts.append(self._programs.instructions(
-                    f"remote_{program}", *operation.arguments(),
-                    displacement=number * DISPLACEMENT))
-        return {program: statistics.median(counts) for program, counts in counted.items()}
+        """What a server sends comes in other pieces each time, which the median evens out too."""
+        return {program: self._programs.median_instructions(
+            f"remote_{program}", *operation.arguments(), before=operation.put_back)
+            for program in ("floor", "library")}
 
     def clock(self):
         self._rounds = {operation.title: self._programs.clock(
