@@ -34,12 +34,11 @@ git_checkout_options toGitCheckoutOptions(const CheckoutOptions &options,
         initGitRecord(git_checkout_options_init, unsigned{GIT_CHECKOUT_OPTIONS_VERSION});
     record.checkout_strategy = static_cast<unsigned>(options.checkoutStrategy);
     record.notify_flags = GIT_CHECKOUT_NOTIFY_ALL;
-    record.notify_cb = makeCallback<&CheckoutCallbacks::notifyProgress, git_checkout_notify_cb>();
+    setCallback<&CheckoutCallbacks::notifyProgress>(record.notify_cb);
     record.notify_payload = &callbacks;
-    record.progress_cb =
-        makeCallback<&CheckoutCallbacks::checkoutProgress, git_checkout_progress_cb>();
+    setCallback<&CheckoutCallbacks::checkoutProgress>(record.progress_cb);
     record.progress_payload = &callbacks;
-    record.perfdata_cb = makeCallback<&CheckoutCallbacks::perfData, git_checkout_perfdata_cb>();
+    setCallback<&CheckoutCallbacks::perfData>(record.perfdata_cb);
     record.perfdata_payload = &callbacks;
     return record;
 }

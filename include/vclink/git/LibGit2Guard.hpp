@@ -25,7 +25,10 @@ class GitMergeDriverLookup;
 /// that probes many folders with GitAdapterFactory::isAdapterFor holds a guard of its own
 /// meanwhile.
 ///
-/// Guards may be made and destroyed on any thread.
+/// Guards may be made and destroyed on any thread. Making one raises std::bad_alloc, and what the
+/// host's log sinks raise of its diagnostic records; libgit2 is then as it was before. A sink that
+/// raises of the record of a guard's end ends the process, as anything does that a destructor
+/// raises.
 class VCLINK_GIT_EXPORT LibGit2Guard
 {
   public:
