@@ -99,7 +99,7 @@ void BasicBranchManager::switchBranch(const BranchName &name)
     const OwnedHandle<git_object> target = revparseObject(repository.get(), name).value();
     const CheckoutOptions options = optionsFactory_->makeCheckoutOptions();
     git_checkout_options record = toGitCheckoutOptions(options, callbacks_->checkoutCallbacks());
-    const SafeLinkGuard links(repository.get(), target.get(), record);
+    SafeLinkGuard links(repository.get(), target.get(), record);
     makeResult(git_checkout_tree(repository.get(), target.get(), &record)).value();
     // Only now, so that a checkout that fails leaves HEAD where it was.
     makeResult(git_repository_set_head(repository.get(), git_reference_name(branch.get()))).value();

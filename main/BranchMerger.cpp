@@ -110,7 +110,7 @@ void BranchMerger::fastForward(git_repository *repository, git_annotated_commit 
     CheckoutOptions options = optionsFactory_->makeCheckoutOptions();
     options.checkoutStrategy = GIT_CHECKOUT_SAFE;
     git_checkout_options record = toGitCheckoutOptions(options, callbacks_->checkoutCallbacks());
-    const SafeLinkGuard links(repository, target.get(), record);
+    SafeLinkGuard links(repository, target.get(), record);
     makeResult(git_checkout_tree(repository, target.get(), &record)).value();
     // Only now, so that a checkout that fails leaves the branch where it was.
     acquire<git_reference>(git_reference_set_target, head.get(), id, nullptr).value();

@@ -1,44 +1,39 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
-#include <string>
-#include <utility>
-#include <vector>
-
 #include <git2/checkout.h>
 
 namespace vclink::git
 {
 
-/// Keeps a checkout by force from writing through symbolic links: libgit2 1.5 takes a link that
-/// stands where a file belongs, or a folder above it, for the thing itself, and writes into
-/// whatever it leads to, inside the working copy or outside. git removes such a link, and so does
-/// this.
+/// Keeps a checkout from going through symbolic links. libgit2 1.5 takes a link that stands where a
+/// file or a folder belongs for the thing itself, and writes and deletes in whatever it leads to,
+/// inside the working copy or outside. What is done about a link in the way depends on the
+/// checkout: ForceLinkGuard removes it, SafeLinkGuard refuses.
 ///
-/// Hears of each file before the first is written, through the record's notifications, which go on
-/// to the callback that the record had. At its end it puts the links back into whose place nothing
-/// has come, which are those of a checkout that failed or was cancelled.
+/// Hears of each file before the first is written, through the record's notifications, which go to
+/// the callback that the record had first.
 class LinkGuard
 {
   public:
-    /// @param record its notification is taken over; goes into the checkout while the guard lives
-    LinkGuard(git_repository *repository, git_checkout_options &record);
     LinkGuard(const LinkGuard &) = delete;
     LinkGuard &operator=(const LinkGuard &) = delete;
-    ~LinkGuard();
+
+  protected:
+    /// @param record its notification is taken over; goes into the checkout while the guard lives
+    explicit LinkGuard(git_checkout_options &record);
+    ~LinkGuard() = default;
 
   private:
-    static int notify(git_checkout_notify_t why, const char *path, const git_diff_file *baseline,
-                      const git_diff_file *target, const git_diff_file *workdir,
-                      void *payload) noexcept;
-    void clearTheWay(const std::string &name);
-    void removeLink(const std::string &path);
+    /// git_checkout_notify_cb, of a file that the record's own callback has let pass.
+    virtual int notify(git_checkout_notify_t why, const char *path, const git_diff_file *baseline,
+                       const git_diff_file *target, const git_diff_file *workdir) = 0;
+    static int pass(git_checkout_notify_t why, const char *path, const git_diff_file *baseline,
+                    const git_diff_file *target, const git_diff_file *workdir,
+                    void *payload) noexcept;
 
-    std::string workdir_;
-    git_checkout_notify_cb next_;
-    void *nextPayload_;
-    /// What was removed: path and target.
-    std::vector<std::pair<std::string, std::string>> removed_;
+    git_checkout_notify_cb first_;
+    void *firstPayload_;
 };
 
 } // namespace vclink::git

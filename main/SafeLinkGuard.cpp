@@ -1,13 +1,11 @@
 // SPDX-License-Identifier: MIT
 #include "main/SafeLinkGuard.hpp"
 
-#include <fcntl.h>
 #include <git2/diff.h>
 #include <git2/object.h>
 #include <git2/oid.h>
 #include <sys/stat.h>
 
-#include "error/errorUtil/callbackException.hpp"
 #include "error/errorUtil/setGitError.hpp"
 #include "util/repository.hpp"
 
@@ -40,37 +38,22 @@ int refuse(const std::string &name)
 
 SafeLinkGuard::SafeLinkGuard(git_repository *repository, const git_object *target,
                              git_checkout_options &record)
-    : repository_(repository), target_(git_oid_tostr_s(git_object_id(target))),
-      next_(record.notify_cb), nextPayload_(record.notify_payload)
+    : LinkGuard(record), repository_(repository), target_(git_oid_tostr_s(git_object_id(target)))
 {
-    record.notify_cb = notify;
-    record.notify_payload = this;
-    // A link that comes later must not be written through either.
-    record.file_open_flags = O_CREAT | O_TRUNC | O_WRONLY | O_NOFOLLOW;
 }
 
-int SafeLinkGuard::notify(git_checkout_notify_t why, const char *path,
+int SafeLinkGuard::notify(git_checkout_notify_t why, const char * /*path*/,
                           const git_diff_file *baseline, const git_diff_file *target,
-                          const git_diff_file *workdir, void *payload) noexcept
+                          const git_diff_file *workdir)
 {
-    const auto &guard = *static_cast<SafeLinkGuard *>(payload);
-    const int code = guard.next_(why, path, baseline, target, workdir, guard.nextPayload_);
-    if (code != 0 || workdir == nullptr || !S_ISLNK(workdir->mode))
+    if (workdir == nullptr || !S_ISLNK(workdir->mode))
     {
-        return code;
+        return 0;
     }
-    try
-    {
-        // The link's own name: the path may be that of a file below it.
-        const std::string name = workdir->path;
-        const bool isInTheWay =
-            isWrittenThrough(why, baseline, target) || guard.isChangedFolder(name);
-        return isInTheWay ? refuse(name) : 0;
-    }
-    catch (...)
-    {
-        return parkCallbackException();
-    }
+    // The link's own name: the path may be that of a file below it.
+    const std::string name = workdir->path;
+    const bool isInTheWay = isWrittenThrough(why, baseline, target) || isChangedFolder(name);
+    return isInTheWay ? refuse(name) : 0;
 }
 
 /// Whether there is a folder of this name that the checkout makes, changes or takes away.

@@ -3,41 +3,33 @@
 
 #include <string>
 
-#include <git2/checkout.h>
 #include <git2/types.h>
+
+#include "main/LinkGuard.hpp"
 
 namespace vclink::git
 {
 
-/// Keeps a safe checkout of a commit from going through symbolic links: libgit2 1.5 takes an
-/// untracked link that stands where a tracked folder belongs for the folder, and writes and deletes
-/// in whatever it leads to, inside the working copy or outside; through an ignored link that stands
-/// where a file belongs it writes into another file. git refuses the former, and this refuses both.
-///
-/// Hears of each file and link before the first is written, through the record's notifications,
-/// which go on to the callback that the record had. A link above files that the checkout does not
-/// touch is no obstacle.
-class SafeLinkGuard
+/// Refuses the safe checkout of a commit where it would go through a link: an untracked one that
+/// stands where a tracked folder belongs, as git does, and an ignored one that stands where a file
+/// belongs, which git overwrites. A link above files that the checkout does not touch is no
+/// obstacle.
+class SafeLinkGuard final : public LinkGuard
 {
   public:
     /// @param target what is checked out; outlives the guard
-    /// @param record its notification is taken over; goes into the checkout while the guard lives,
-    /// which fails with GIT_ECONFLICT where a link is in the way
+    /// @param record as for LinkGuard; the checkout fails with GIT_ECONFLICT where a link is in the
+    /// way
     SafeLinkGuard(git_repository *repository, const git_object *target,
                   git_checkout_options &record);
-    SafeLinkGuard(const SafeLinkGuard &) = delete;
-    SafeLinkGuard &operator=(const SafeLinkGuard &) = delete;
 
   private:
-    static int notify(git_checkout_notify_t why, const char *path, const git_diff_file *baseline,
-                      const git_diff_file *target, const git_diff_file *workdir,
-                      void *payload) noexcept;
+    int notify(git_checkout_notify_t why, const char *path, const git_diff_file *baseline,
+               const git_diff_file *target, const git_diff_file *workdir) override;
     bool isChangedFolder(const std::string &name) const;
 
     git_repository *repository_;
     std::string target_;
-    git_checkout_notify_cb next_;
-    void *nextPayload_;
 };
 
 } // namespace vclink::git

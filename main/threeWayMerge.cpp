@@ -11,7 +11,7 @@
 #include "error/raise.hpp"
 #include "fl/i18n/convert.hpp"
 #include "main/BranchMerger.hpp"
-#include "main/LinkGuard.hpp"
+#include "main/ForceLinkGuard.hpp"
 #include "options/gitRecords.hpp"
 #include "util/PathspecArray.hpp"
 #include "util/pathspecEscape.hpp"
@@ -99,7 +99,7 @@ void BranchMerger::threeWayMerge(const BranchName &name, git_repository *reposit
         toGitCheckoutOptions(options, callbacks_->checkoutCallbacks());
     const git_merge_options mergeRecord = toGitMergeOptions(mergeOptions);
     const git_annotated_commit *heads[] = {theirs};
-    LinkGuard links(repository, checkoutRecord);
+    ForceLinkGuard links(repository, checkoutRecord);
     makeResult(git_merge(repository, heads, 1, &mergeRecord, &checkoutRecord)).value();
     const OwnedHandle<git_index> index = getRepositoryIndex(repository);
     if (git_index_has_conflicts(index.get()) != 0)

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-#include "main/LinkGuard.hpp"
+#include "main/ForceLinkGuard.hpp"
 
 #include <filesystem>
 #include <string>
@@ -40,10 +40,10 @@ int hear(git_checkout_notify_t /*why*/, const char *path, const git_diff_file * 
 }
 
 /// A folder and a file of the repository have become links to what lies outside.
-class LinkGuard : public vclink::test::StagingTest
+class ForceLinkGuard : public vclink::test::StagingTest
 {
   protected:
-    LinkGuard()
+    ForceLinkGuard()
     {
         repository_.write("folder/a", "committed");
         repository_.write("zlast", "committed");
@@ -68,7 +68,7 @@ class LinkGuard : public vclink::test::StagingTest
         record.notify_flags = GIT_CHECKOUT_NOTIFY_ALL;
         record.notify_cb = hear;
         record.notify_payload = &heard_;
-        git::LinkGuard links(repository.get(), record);
+        git::ForceLinkGuard links(repository.get(), record);
         return git_checkout_index(repository.get(), nullptr, &record);
     }
     void expectNothingOutsideChanged() const
@@ -80,7 +80,7 @@ class LinkGuard : public vclink::test::StagingTest
     Heard heard_;
 };
 
-TEST_F(LinkGuard, MakesFilesAndFoldersAgainOfLinks)
+TEST_F(ForceLinkGuard, MakesFilesAndFoldersAgainOfLinks)
 {
     EXPECT_EQ(checkOut(), 0);
     EXPECT_EQ(repository_.git({"status", "--porcelain"}), "");
@@ -89,7 +89,7 @@ TEST_F(LinkGuard, MakesFilesAndFoldersAgainOfLinks)
     expectNothingOutsideChanged();
 }
 
-TEST_F(LinkGuard, HandsTheNotificationsOn)
+TEST_F(ForceLinkGuard, HandsTheNotificationsOn)
 {
     EXPECT_EQ(checkOut(), 0);
     EXPECT_THAT(heard_.names, Contains("folder/a"));
@@ -97,7 +97,7 @@ TEST_F(LinkGuard, HandsTheNotificationsOn)
     EXPECT_THAT(heard_.names, Contains("zlast"));
 }
 
-TEST_F(LinkGuard, PutsTheLinksBackWhenTheCheckoutIsGivenUp)
+TEST_F(ForceLinkGuard, PutsTheLinksBackWhenTheCheckoutIsGivenUp)
 {
     const std::string before = repository_.git({"status", "--porcelain"});
     heard_.failsAt = "zlast";
@@ -109,14 +109,14 @@ TEST_F(LinkGuard, PutsTheLinksBackWhenTheCheckoutIsGivenUp)
     expectNothingOutsideChanged();
 }
 
-TEST_F(LinkGuard, LeavesTheLinkOfAFileThatTheCallbackRefuses)
+TEST_F(ForceLinkGuard, LeavesTheLinkOfAFileThatTheCallbackRefuses)
 {
     heard_.failsAt = "folder/a";
     EXPECT_EQ(checkOut(), GIT_EAUTH);
     EXPECT_EQ(fs::read_symlink(repository_ / "folder"), "../outside");
 }
 
-TEST_F(LinkGuard, LeavesTrackedAndUntrackedLinksThatAreNotInTheWay)
+TEST_F(ForceLinkGuard, LeavesTrackedAndUntrackedLinksThatAreNotInTheWay)
 {
     ASSERT_EQ(checkOut(), 0);
     repository_.symlink("zlast", "tracked");
@@ -131,7 +131,7 @@ TEST_F(LinkGuard, LeavesTrackedAndUntrackedLinksThatAreNotInTheWay)
     EXPECT_EQ(repository_.read("zlast"), "committed");
 }
 
-TEST_F(LinkGuard, HoldsInAMerge)
+TEST_F(ForceLinkGuard, HoldsInAMerge)
 {
     repository_.git({"config", "user.name", "Somebody"});
     repository_.git({"config", "user.email", "somebody@example.com"});
@@ -153,7 +153,7 @@ TEST_F(LinkGuard, HoldsInAMerge)
 }
 
 /// The states are not known then, and are not needed.
-TEST_F(LinkGuard, HoldsInARevertWhoseStateWalkFails)
+TEST_F(ForceLinkGuard, HoldsInARevertWhoseStateWalkFails)
 {
     GitRepository::init(repository_ / "line\nfeed").commit("first");
     repository_.write(".gitmodules", "[submodule \"s\"]\n\tpath = \"line\\nfeed\"\n");
