@@ -8,13 +8,14 @@
 #include <cstdlib>
 #include <utility>
 
-#include <dlfcn.h>
 #include <fcntl.h>
 #include <netdb.h>
 #include <sys/socket.h>
 #include <sys/stat.h>
 #include <sys/time.h>
 #include <unistd.h>
+
+#include "support/interposition.hpp"
 
 namespace
 {
@@ -73,17 +74,6 @@ bool refuses(const char *function, const char *path, Last last)
     return true;
 }
 
-template <class Function> Function *findReal(const char *name) noexcept
-{
-    return reinterpret_cast<Function *>(::dlsym(RTLD_NEXT, name));
-}
-
-mode_t readMode(int flags, va_list arguments)
-{
-    const bool hasMode = (flags & O_CREAT) != 0 || (flags & O_TMPFILE) == O_TMPFILE;
-    return hasMode ? va_arg(arguments, mode_t) : 0;
-}
-
 } // namespace
 
 namespace vclink::fuzz
@@ -107,6 +97,9 @@ std::string Confinement::takeTrespass()
 
 } // namespace vclink::fuzz
 
+using vclink::test::findNext;
+using vclink::test::readMode;
+
 extern "C"
 {
 #pragma GCC visibility push(default)
@@ -117,7 +110,7 @@ extern "C"
         va_start(arguments, flags);
         const mode_t mode = readMode(flags, arguments);
         va_end(arguments);
-        static auto *const real = findReal<int(const char *, int, ...)>("open");
+        static auto *const real = findNext<int(const char *, int, ...)>("open");
         const bool writes = (flags & (O_WRONLY | O_RDWR | O_CREAT | O_TRUNC)) != 0;
         const bool isNew = (flags & (O_CREAT | O_EXCL)) == (O_CREAT | O_EXCL);
         return writes && refuses("open", path, isNew ? Last::Taken : Last::Followed)
@@ -127,25 +120,25 @@ extern "C"
 
     int mkdir(const char *path, mode_t mode) noexcept
     {
-        static auto *const real = findReal<int(const char *, mode_t)>("mkdir");
+        static auto *const real = findNext<int(const char *, mode_t)>("mkdir");
         return refuses("mkdir", path, Last::Taken) ? -1 : real(path, mode);
     }
 
     int rmdir(const char *path) noexcept
     {
-        static auto *const real = findReal<int(const char *)>("rmdir");
+        static auto *const real = findNext<int(const char *)>("rmdir");
         return refuses("rmdir", path, Last::Taken) ? -1 : real(path);
     }
 
     int unlink(const char *path) noexcept
     {
-        static auto *const real = findReal<int(const char *)>("unlink");
+        static auto *const real = findNext<int(const char *)>("unlink");
         return refuses("unlink", path, Last::Taken) ? -1 : real(path);
     }
 
     int rename(const char *from, const char *to) noexcept
     {
-        static auto *const real = findReal<int(const char *, const char *)>("rename");
+        static auto *const real = findNext<int(const char *, const char *)>("rename");
         return refuses("rename", from, Last::Taken) || refuses("rename", to, Last::Taken)
                    ? -1
                    : real(from, to);
@@ -153,38 +146,38 @@ extern "C"
 
     int link(const char *from, const char *to) noexcept
     {
-        static auto *const real = findReal<int(const char *, const char *)>("link");
+        static auto *const real = findNext<int(const char *, const char *)>("link");
         return refuses("link", to, Last::Taken) ? -1 : real(from, to);
     }
 
     int symlink(const char *target, const char *path) noexcept
     {
-        static auto *const real = findReal<int(const char *, const char *)>("symlink");
+        static auto *const real = findNext<int(const char *, const char *)>("symlink");
         return refuses("symlink", path, Last::Taken) ? -1 : real(target, path);
     }
 
     int chmod(const char *path, mode_t mode) noexcept
     {
-        static auto *const real = findReal<int(const char *, mode_t)>("chmod");
+        static auto *const real = findNext<int(const char *, mode_t)>("chmod");
         return refuses("chmod", path, Last::Followed) ? -1 : real(path, mode);
     }
 
     int utimes(const char *path, const timeval times[2]) noexcept
     {
-        static auto *const real = findReal<int(const char *, const timeval *)>("utimes");
+        static auto *const real = findNext<int(const char *, const timeval *)>("utimes");
         return refuses("utimes", path, Last::Followed) ? -1 : real(path, times);
     }
 
     pid_t fork() noexcept
     {
-        static auto *const real = findReal<pid_t()>("fork");
+        static auto *const real = findNext<pid_t()>("fork");
         errno = EAGAIN;
         return isConfined ? -1 : real();
     }
 
     int connect(int descriptor, const sockaddr *address, socklen_t length)
     {
-        static auto *const real = findReal<int(int, const sockaddr *, socklen_t)>("connect");
+        static auto *const real = findNext<int(int, const sockaddr *, socklen_t)>("connect");
         errno = ENETUNREACH;
         return isConfined ? -1 : real(descriptor, address, length);
     }
@@ -192,7 +185,7 @@ extern "C"
     int getaddrinfo(const char *name, const char *service, const addrinfo *hints, addrinfo **found)
     {
         static auto *const real =
-            findReal<int(const char *, const char *, const addrinfo *, addrinfo **)>("getaddrinfo");
+            findNext<int(const char *, const char *, const addrinfo *, addrinfo **)>("getaddrinfo");
         return isConfined ? EAI_FAIL : real(name, service, hints, found);
     }
 

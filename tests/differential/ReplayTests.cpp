@@ -14,12 +14,12 @@
 
 #include <gtest/gtest.h>
 
-#include "../main/RepositoryState.hpp"
 #include "FloorMerge.hpp"
 #include "MergeHistory.hpp"
 #include "mergeDifferences.hpp"
 #include "support/GitTest.hpp"
 #include "support/LibGit2Session.hpp"
+#include "support/RepositoryState.hpp"
 #include "support/TestInteractor.hpp"
 #include "support/text.hpp"
 #include "vclink/git/BranchManager.hpp"

@@ -9,8 +9,8 @@
 #include <gtest/gtest.h>
 
 #include "foundation/core/except/IMsgIDException.hpp"
-#include "main/RepositoryState.hpp"
 #include "quoting.hpp"
+#include "support/RepositoryState.hpp"
 #include "support/TestInteractor.hpp"
 #include "support/text.hpp"
 #include "vclink/git/GitAdapterFactory.hpp"

@@ -6,9 +6,9 @@
 #include <string>
 #include <vector>
 
-#include "../main/RepositoryState.hpp"
 #include "MergeHistory.hpp"
 #include "support/GitRepository.hpp"
+#include "support/RepositoryState.hpp"
 
 namespace vclink::test
 {

@@ -9,9 +9,9 @@
 
 #include <gtest/gtest.h>
 
-#include "Operation.hpp"
-#include "Trial.hpp"
 #include "UserWork.hpp"
+#include "fault/Operation.hpp"
+#include "fault/Trial.hpp"
 #include "support/GitTest.hpp"
 #include "support/LibGit2Session.hpp"
 

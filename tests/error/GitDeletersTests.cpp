@@ -1,13 +1,11 @@
 // SPDX-License-Identifier: MIT
 #include "error/errorUtil/GitDeleters.hpp"
 
-#include <cstring>
 #include <string>
 #include <type_traits>
 #include <utility>
 #include <vector>
 
-#include <dlfcn.h>
 #include <git2.h>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
@@ -15,6 +13,7 @@
 #include "error/errorUtil/GitResult.hpp"
 #include "support/GitTest.hpp"
 #include "support/LibGit2Session.hpp"
+#include "support/interposition.hpp"
 
 namespace
 {
@@ -26,11 +25,7 @@ std::vector<Release> releases;
 template <class Handle> void noteAndForward(const char *name, Handle *handle)
 {
     releases.emplace_back(name, handle);
-    void *const symbol = dlsym(RTLD_NEXT, name);
-    void (*forward)(Handle *) = nullptr;
-    static_assert(sizeof(forward) == sizeof(symbol));
-    std::memcpy(&forward, &symbol, sizeof(forward));
-    forward(handle);
+    vclink::test::findNext<void(Handle *)>(name)(handle);
 }
 
 } // namespace

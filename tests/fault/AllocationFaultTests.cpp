@@ -10,10 +10,10 @@
 
 #include <gtest/gtest.h>
 
-#include "../main/FailingAllocations.hpp"
-#include "../util/NothingLeft.hpp"
 #include "FaultTest.hpp"
 #include "error/errorUtil/callbackException.hpp"
+#include "support/FailingAllocations.hpp"
+#include "support/NothingLeft.hpp"
 
 namespace
 {

@@ -6,10 +6,11 @@
 #include <cstring>
 #include <utility>
 
-#include <dlfcn.h>
 #include <fcntl.h>
 #include <sys/stat.h>
 #include <unistd.h>
+
+#include "support/interposition.hpp"
 
 namespace
 {
@@ -47,18 +48,6 @@ bool isLookAt(const char *path) noexcept
 bool lookFails(const char *function, const char *path) noexcept
 {
     return isLookAt(path) ? countAndFail(function) : fails(function);
-}
-
-/// The C library's own function, or a sanitizer's in its place.
-template <class Function> Function *findReal(const char *name) noexcept
-{
-    return reinterpret_cast<Function *>(::dlsym(RTLD_NEXT, name));
-}
-
-mode_t readMode(int flags, va_list arguments)
-{
-    const bool hasMode = (flags & O_CREAT) != 0 || (flags & O_TMPFILE) == O_TMPFILE;
-    return hasMode ? va_arg(arguments, mode_t) : 0;
 }
 
 } // namespace
@@ -103,6 +92,9 @@ std::string FailingFiles::failed() const
 
 } // namespace vclink::test
 
+using vclink::test::findNext;
+using vclink::test::readMode;
+
 extern "C"
 {
 #pragma GCC visibility push(default)
@@ -113,7 +105,7 @@ extern "C"
         va_start(arguments, flags);
         const mode_t mode = readMode(flags, arguments);
         va_end(arguments);
-        static auto *const real = findReal<int(const char *, int, ...)>("open");
+        static auto *const real = findNext<int(const char *, int, ...)>("open");
         return fails("open") ? -1 : real(path, flags, mode);
     }
 
@@ -123,86 +115,86 @@ extern "C"
         va_start(arguments, flags);
         const mode_t mode = readMode(flags, arguments);
         va_end(arguments);
-        static auto *const real = findReal<int(int, const char *, int, ...)>("openat");
+        static auto *const real = findNext<int(int, const char *, int, ...)>("openat");
         return fails("openat") ? -1 : real(folder, path, flags, mode);
     }
 
     int creat(const char *path, mode_t mode)
     {
-        static auto *const real = findReal<int(const char *, mode_t)>("creat");
+        static auto *const real = findNext<int(const char *, mode_t)>("creat");
         return fails("creat") ? -1 : real(path, mode);
     }
 
     ssize_t read(int descriptor, void *data, size_t size)
     {
-        static auto *const real = findReal<ssize_t(int, void *, size_t)>("read");
+        static auto *const real = findNext<ssize_t(int, void *, size_t)>("read");
         return fails("read") ? -1 : real(descriptor, data, size);
     }
 
     ssize_t write(int descriptor, const void *data, size_t size)
     {
-        static auto *const real = findReal<ssize_t(int, const void *, size_t)>("write");
+        static auto *const real = findNext<ssize_t(int, const void *, size_t)>("write");
         return fails("write") ? -1 : real(descriptor, data, size);
     }
 
     ssize_t pread(int descriptor, void *data, size_t size, off_t offset)
     {
-        static auto *const real = findReal<ssize_t(int, void *, size_t, off_t)>("pread");
+        static auto *const real = findNext<ssize_t(int, void *, size_t, off_t)>("pread");
         return fails("pread") ? -1 : real(descriptor, data, size, offset);
     }
 
     ssize_t pwrite(int descriptor, const void *data, size_t size, off_t offset)
     {
-        static auto *const real = findReal<ssize_t(int, const void *, size_t, off_t)>("pwrite");
+        static auto *const real = findNext<ssize_t(int, const void *, size_t, off_t)>("pwrite");
         return fails("pwrite") ? -1 : real(descriptor, data, size, offset);
     }
 
     int rename(const char *from, const char *to) noexcept
     {
-        static auto *const real = findReal<int(const char *, const char *)>("rename");
+        static auto *const real = findNext<int(const char *, const char *)>("rename");
         return fails("rename") ? -1 : real(from, to);
     }
 
     int link(const char *from, const char *to) noexcept
     {
-        static auto *const real = findReal<int(const char *, const char *)>("link");
+        static auto *const real = findNext<int(const char *, const char *)>("link");
         return fails("link") ? -1 : real(from, to);
     }
 
     int mkdir(const char *path, mode_t mode) noexcept
     {
-        static auto *const real = findReal<int(const char *, mode_t)>("mkdir");
+        static auto *const real = findNext<int(const char *, mode_t)>("mkdir");
         return fails("mkdir") ? -1 : real(path, mode);
     }
 
     int close(int descriptor)
     {
-        static auto *const real = findReal<int(int)>("close");
+        static auto *const real = findNext<int(int)>("close");
         const int result = real(descriptor);
         return fails("close") ? -1 : result;
     }
 
     int stat(const char *path, struct stat *status) noexcept
     {
-        static auto *const real = findReal<int(const char *, struct stat *)>("stat");
+        static auto *const real = findNext<int(const char *, struct stat *)>("stat");
         return lookFails("stat", path) ? -1 : real(path, status);
     }
 
     int lstat(const char *path, struct stat *status) noexcept
     {
-        static auto *const real = findReal<int(const char *, struct stat *)>("lstat");
+        static auto *const real = findNext<int(const char *, struct stat *)>("lstat");
         return lookFails("lstat", path) ? -1 : real(path, status);
     }
 
     int access(const char *path, int mode) noexcept
     {
-        static auto *const real = findReal<int(const char *, int)>("access");
+        static auto *const real = findNext<int(const char *, int)>("access");
         return isLookAt(path) && countAndFail("access") ? -1 : real(path, mode);
     }
 
     int fstat(int descriptor, struct stat *status) noexcept
     {
-        static auto *const real = findReal<int(int, struct stat *)>("fstat");
+        static auto *const real = findNext<int(int, struct stat *)>("fstat");
         return fails("fstat") ? -1 : real(descriptor, status);
     }
 

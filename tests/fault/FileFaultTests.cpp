@@ -16,13 +16,13 @@
 #include <gtest/gtest.h>
 #include <sys/wait.h>
 
-#include "../differential/expectedStates.hpp"
-#include "../differential/moves.hpp"
-#include "../util/NothingLeft.hpp"
 #include "FailingFiles.hpp"
 #include "FaultTest.hpp"
 #include "LibGit2Faults.hpp"
+#include "differential/expectedStates.hpp"
+#include "differential/moves.hpp"
 #include "error/errorUtil/callbackException.hpp"
+#include "support/NothingLeft.hpp"
 #include "support/text.hpp"
 
 namespace

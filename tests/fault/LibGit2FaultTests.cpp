@@ -13,11 +13,11 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "../util/NothingLeft.hpp"
 #include "FaultTest.hpp"
 #include "LibGit2Faults.hpp"
 #include "error/errorUtil/callbackException.hpp"
 #include "expectedOutcomes.hpp"
+#include "support/NothingLeft.hpp"
 
 namespace
 {

@@ -1,7 +1,8 @@
 // SPDX-License-Identifier: MIT
-#include <dlfcn.h>
 
-#include "../main/FailingAllocations.hpp"
+#include "support/FailingAllocations.hpp"
+
+#include "support/interposition.hpp"
 
 /// Stands before boost::filesystem::path::compare, which must not raise and yet allocates up to
 /// release 1.76: there a failing allocation ends the process, whoever compares.
@@ -12,7 +13,7 @@ extern "C" __attribute__((visibility("default"))) int comparePaths(const void *l
 extern "C" int comparePaths(const void *left, const void *right) noexcept
 {
     const vclink::test::AllocationsSucceed pause;
-    static auto *const compare = reinterpret_cast<int (*)(const void *, const void *)>(
-        ::dlsym(RTLD_NEXT, "_ZNK5boost10filesystem4path7compareERKS1_"));
+    static auto *const compare = vclink::test::findNext<int(const void *, const void *)>(
+        "_ZNK5boost10filesystem4path7compareERKS1_");
     return compare(left, right);
 }

@@ -1,12 +1,12 @@
 // SPDX-License-Identifier: MIT
 #include "BranchCalls.hpp"
-#include "error/errorUtil/setGitError.hpp"
 
 #include <cstring>
-#include <stdexcept>
 
-#include <dlfcn.h>
 #include <git2/sys/merge.h>
+
+#include "error/errorUtil/setGitError.hpp"
+#include "support/interposition.hpp"
 
 namespace
 {
@@ -35,14 +35,6 @@ bool isWatched()
     return current != nullptr && depth == 0;
 }
 
-template <class Function> Function *findReal(const std::string &name)
-{
-    void *const symbol = ::dlsym(RTLD_NEXT, name.c_str());
-    if (symbol == nullptr)
-        throw std::runtime_error(name);
-    return reinterpret_cast<Function *>(symbol);
-}
-
 /// Notes the call and goes on to libgit2.
 template <class Function, class... Arguments>
 auto forward(const std::string &name, Arguments... arguments)
@@ -50,7 +42,7 @@ auto forward(const std::string &name, Arguments... arguments)
     if (isWatched())
         current->names.push_back(name.substr(4));
     const Inside inside;
-    return findReal<Function>(name)(arguments...);
+    return vclink::test::findNext<Function>(name.c_str())(arguments...);
 }
 
 /// Notes the call, and fails or goes on to libgit2.

@@ -8,8 +8,8 @@
 #include <vector>
 
 #include "AdapterTest.hpp"
-#include "RepositoryState.hpp"
 #include "resource_core/BaseMsgID.hpp"
+#include "support/RepositoryState.hpp"
 #include "vclink/git/BranchManager.hpp"
 
 namespace vclink::test

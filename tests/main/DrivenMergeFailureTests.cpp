@@ -11,10 +11,10 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "../util/SignalAction.hpp"
 #include "DrivenMergeTest.hpp"
 #include "error/logging/severity.hpp"
 #include "support/LogCapture.hpp"
+#include "support/SignalAction.hpp"
 #include "support/text.hpp"
 #include "vclink/git/GitException.hpp"
 #include "vclink/git/messageIdentifiers.hpp"

@@ -8,8 +8,8 @@
 
 #include <gtest/gtest.h>
 
-#include "../util/SignalAction.hpp"
 #include "DrivenMergeTest.hpp"
+#include "support/SignalAction.hpp"
 #include "support/ThousandDescriptors.hpp"
 #include "support/UnprivilegedUser.hpp"
 #include "support/WorkingFolder.hpp"

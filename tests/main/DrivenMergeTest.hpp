@@ -6,9 +6,9 @@
 
 #include <gtest/gtest.h>
 
-#include "../util/NothingLeft.hpp"
-#include "../util/Scripts.hpp"
 #include "MergeTest.hpp"
+#include "support/NothingLeft.hpp"
+#include "support/Scripts.hpp"
 
 namespace vclink::test
 {

@@ -11,9 +11,9 @@
 #include <gtest/gtest.h>
 
 #include "AdapterTest.hpp"
-#include "FailingAllocations.hpp"
 #include "LibGit2Calls.hpp"
 #include "error/errorUtil/callbackException.hpp"
+#include "support/FailingAllocations.hpp"
 #include "support/text.hpp"
 #include "vclink/git/GitAdapterFactory.hpp"
 

@@ -2,9 +2,10 @@
 #include "LibGit2Calls.hpp"
 
 #include "passToLibGit2.hpp"
+#include "support/interposition.hpp"
 
+using vclink::test::findNext;
 using vclink::test::detail::current;
-using vclink::test::detail::findReal;
 using vclink::test::detail::pass;
 using vclink::test::detail::passAcquiring;
 using vclink::test::detail::Passing;
@@ -33,7 +34,7 @@ int git_libgit2_init()
     const Passing passing("git_libgit2_init");
     if (passing.isNoted() && current->onInit)
         return current->onInit();
-    return findReal<decltype(git_libgit2_init)>("git_libgit2_init")();
+    return findNext<decltype(git_libgit2_init)>("git_libgit2_init")();
 }
 
 int git_libgit2_shutdown()
@@ -41,7 +42,7 @@ int git_libgit2_shutdown()
     const Passing passing("git_libgit2_shutdown");
     if (passing.isNoted() && current->onShutdown)
         return current->onShutdown();
-    return findReal<decltype(git_libgit2_shutdown)>("git_libgit2_shutdown")();
+    return findNext<decltype(git_libgit2_shutdown)>("git_libgit2_shutdown")();
 }
 
 int git_libgit2_version(int *major, int *minor, int *revision)
@@ -49,7 +50,7 @@ int git_libgit2_version(int *major, int *minor, int *revision)
     const Passing passing("git_libgit2_version");
     if (passing.isNoted() && current->onVersion)
         return current->onVersion(major, minor, revision);
-    return findReal<decltype(git_libgit2_version)>("git_libgit2_version")(major, minor, revision);
+    return findNext<decltype(git_libgit2_version)>("git_libgit2_version")(major, minor, revision);
 }
 
 int git_libgit2_features()
@@ -57,7 +58,7 @@ int git_libgit2_features()
     const Passing passing("git_libgit2_features");
     if (passing.isNoted() && current->onFeatures)
         return current->onFeatures();
-    return findReal<decltype(git_libgit2_features)>("git_libgit2_features")();
+    return findNext<decltype(git_libgit2_features)>("git_libgit2_features")();
 }
 
 int git_status_options_init(git_status_options *options, unsigned version)
@@ -65,7 +66,7 @@ int git_status_options_init(git_status_options *options, unsigned version)
     const Passing passing("git_status_options_init");
     if (passing.isNoted() && current->onStatusOptionsInit)
         return current->onStatusOptionsInit();
-    return findReal<decltype(git_status_options_init)>("git_status_options_init")(options, version);
+    return findNext<decltype(git_status_options_init)>("git_status_options_init")(options, version);
 }
 
 int git_repository_open_ext(git_repository **out, const char *path, unsigned flags,
@@ -75,7 +76,7 @@ int git_repository_open_ext(git_repository **out, const char *path, unsigned fla
     if (out == nullptr)
     {
         const Passing passing("git_repository_open_ext(nullptr)");
-        return findReal<decltype(git_repository_open_ext)>("git_repository_open_ext")(
+        return findNext<decltype(git_repository_open_ext)>("git_repository_open_ext")(
             out, path, flags, ceilings);
     }
     return passAcquiring("git_repository_open_ext", git_repository_open_ext, out, path, flags,
@@ -86,7 +87,7 @@ int git_status_foreach_ext(git_repository *repository, const git_status_options 
                            git_status_cb callback, void *payload)
 {
     const Passing passing("git_status_foreach_ext");
-    auto *const real = findReal<decltype(git_status_foreach_ext)>("git_status_foreach_ext");
+    auto *const real = findNext<decltype(git_status_foreach_ext)>("git_status_foreach_ext");
     if (passing.isNoted() && current->onStatusForeach)
         return current->onStatusForeach(real, repository, options, callback, payload);
     return real(repository, options, callback, payload);

@@ -2,10 +2,11 @@
 // The calls of remotes and clones, beside those of LibGit2Calls.cpp.
 #include "LibGit2Calls.hpp"
 #include "passToLibGit2.hpp"
+#include "support/interposition.hpp"
 
+using vclink::test::findNext;
 using vclink::test::LibGit2Calls;
 using vclink::test::detail::current;
-using vclink::test::detail::findReal;
 using vclink::test::detail::injected;
 using vclink::test::detail::pass;
 using vclink::test::detail::passAcquiring;
@@ -84,7 +85,7 @@ int git_remote_ls(const git_remote_head ***heads, std::size_t *count, git_remote
         return current->listInstead(heads, count);
     if (const int code = injected(passing, "git_remote_ls"); code != 0)
         return code;
-    return findReal<decltype(git_remote_ls)>("git_remote_ls")(heads, count, remote);
+    return findNext<decltype(git_remote_ls)>("git_remote_ls")(heads, count, remote);
 }
 
 int git_clone(git_repository **out, const char *url, const char *path,

@@ -11,9 +11,9 @@
 #include <gtest/gtest.h>
 #include <pthread.h>
 
-#include "../util/Scripts.hpp"
 #include "support/GitTest.hpp"
 #include "support/LibGit2Session.hpp"
+#include "support/Scripts.hpp"
 #include "support/TestInteractor.hpp"
 #include "support/text.hpp"
 #include "vclink/CMAdapter.hpp"

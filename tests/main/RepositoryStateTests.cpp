@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-#include "RepositoryState.hpp"
+#include "support/RepositoryState.hpp"
 
 #include <functional>
 #include <string>

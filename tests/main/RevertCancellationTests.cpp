@@ -12,11 +12,11 @@
 #include <gtest/gtest.h>
 
 #include "AdapterTest.hpp"
-#include "RepositoryState.hpp"
 #include "error/errorUtil/callbackException.hpp"
 #include "error/logging/severity.hpp"
 #include "error/raise.hpp"
 #include "support/LogCapture.hpp"
+#include "support/RepositoryState.hpp"
 #include "support/text.hpp"
 #include "vclink/PollableTerminator.hpp"
 #include "vclink/git/messageIdentifiers.hpp"

@@ -10,11 +10,11 @@
 #include <gtest/gtest.h>
 
 #include "AdapterTest.hpp"
-#include "RepositoryState.hpp"
 #include "error/errorUtil/callbackException.hpp"
 #include "error/logging/severity.hpp"
 #include "support/LocaleOfTheProcess.hpp"
 #include "support/LogCapture.hpp"
+#include "support/RepositoryState.hpp"
 #include "support/text.hpp"
 
 namespace

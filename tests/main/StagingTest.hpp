@@ -11,8 +11,8 @@
 #include <gtest/gtest.h>
 
 #include "AdapterTest.hpp"
-#include "RepositoryState.hpp"
 #include "error/raise.hpp"
+#include "support/RepositoryState.hpp"
 #include "support/text.hpp"
 #include "vclink/git/messageIdentifiers.hpp"
 

@@ -1,13 +1,11 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
-#include <stdexcept>
 #include <string>
-
-#include <dlfcn.h>
 
 #include "LibGit2Calls.hpp"
 #include "error/errorUtil/setGitError.hpp"
+#include "support/interposition.hpp"
 
 /// What the definitions that stand in libgit2's place are made of.
 namespace vclink::test::detail
@@ -15,14 +13,6 @@ namespace vclink::test::detail
 
 inline LibGit2Calls *current = nullptr;
 inline int depth = 0;
-
-template <class Function> Function *findReal(const char *name)
-{
-    void *const symbol = ::dlsym(RTLD_NEXT, name);
-    if (symbol == nullptr)
-        throw std::runtime_error(name);
-    return reinterpret_cast<Function *>(symbol);
-}
 
 /// A call that passes through, noted unless libgit2 makes it of itself.
 class Passing
@@ -72,7 +62,7 @@ int pass(const char *name, Function *, Arguments... arguments)
     const Passing passing(name);
     if (const int code = injected(passing, name); code != 0)
         return code;
-    return findReal<Function>(name)(arguments...);
+    return findNext<Function>(name)(arguments...);
 }
 
 /// As pass(), of a call that gives out a handle.
@@ -82,7 +72,7 @@ int passAcquiring(const char *name, Function *, Handle **out, Arguments... argum
     const Passing passing(name);
     if (const int code = injected(passing, name); code != 0)
         return code;
-    const int code = findReal<Function>(name)(out, arguments...);
+    const int code = findNext<Function>(name)(out, arguments...);
     if (passing.isNoted() && code == 0 && out != nullptr)
         current->handles.insert(*out);
     return code;
@@ -94,7 +84,7 @@ template <class Handle> void passReleasing(const char *name, Handle *handle)
     const Passing passing(name);
     if (passing.isNoted())
         current->handles.erase(handle);
-    findReal<void(Handle *)>(name)(handle);
+    findNext<void(Handle *)>(name)(handle);
 }
 
 template <class Hook, class... Arguments> void tell(Hook hook, Arguments... arguments)

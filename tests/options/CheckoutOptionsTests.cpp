@@ -7,7 +7,6 @@
 #include <string>
 #include <vector>
 
-#include <dlfcn.h>
 #include <git2.h>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
@@ -20,6 +19,7 @@
 #include "options/gitRecords.hpp"
 #include "support/LogCapture.hpp"
 #include "support/TestInteractor.hpp"
+#include "support/interposition.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
 #include "vclink/util/exception/CancelledOperationException.hpp"
 
@@ -40,11 +40,7 @@ int git_checkout_options_init(git_checkout_options *options, unsigned version)
     {
         return onInit(options, version);
     }
-    void *const symbol = dlsym(RTLD_NEXT, "git_checkout_options_init");
-    Init *real = nullptr;
-    static_assert(sizeof(real) == sizeof(symbol));
-    std::memcpy(&real, &symbol, sizeof(real));
-    return real(options, version);
+    return vclink::test::findNext<Init>("git_checkout_options_init")(options, version);
 }
 
 namespace vclink::git

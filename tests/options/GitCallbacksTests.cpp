@@ -8,12 +8,12 @@
 #include <utility>
 #include <vector>
 
-#include <dlfcn.h>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include "error/VirtualTable.hpp"
 #include "support/TestInteractor.hpp"
+#include "support/interposition.hpp"
 
 namespace
 {
@@ -25,15 +25,6 @@ struct Event
     const void *object;
 };
 std::vector<Event> events;
-
-template <class Function> Function *nextDefinitionOf(const char *name)
-{
-    void *const symbol = dlsym(RTLD_NEXT, name);
-    Function *function = nullptr;
-    static_assert(sizeof(function) == sizeof(symbol));
-    std::memcpy(&function, &symbol, sizeof(function));
-    return function;
-}
 
 constexpr const char *constructorName = "_ZN6vclink18PollableTerminatorC1ERNS_10TerminatorE";
 constexpr const char *destructorName = "_ZN6vclink18PollableTerminatorD1Ev";
@@ -49,13 +40,13 @@ void disconnectPoller(void *poller) __asm__("_ZN6vclink18PollableTerminatorD1Ev"
 void connectPoller(void *poller, vclink::Terminator &source)
 {
     events.push_back({"connected", poller});
-    nextDefinitionOf<void(void *, vclink::Terminator &)>(constructorName)(poller, source);
+    vclink::test::findNext<void(void *, vclink::Terminator &)>(constructorName)(poller, source);
 }
 
 void disconnectPoller(void *poller)
 {
     events.push_back({"disconnected", poller});
-    nextDefinitionOf<void(void *)>(destructorName)(poller);
+    vclink::test::findNext<void(void *)>(destructorName)(poller);
 }
 
 namespace vclink::git

@@ -7,7 +7,6 @@
 #include <string>
 #include <vector>
 
-#include <dlfcn.h>
 #include <git2.h>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
@@ -20,6 +19,7 @@
 #include "options/gitRecords.hpp"
 #include "support/LogCapture.hpp"
 #include "support/TestInteractor.hpp"
+#include "support/interposition.hpp"
 #include "vclink/git/GitOptionsFactory.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
 #include "vclink/util/exception/CancelledOperationException.hpp"
@@ -47,11 +47,7 @@ template <class Record> int init(const char *name, Record *record, unsigned vers
         git_error_set_str(GIT_ERROR_INVALID, "invalid version");
         return -1;
     }
-    void *const symbol = dlsym(RTLD_NEXT, name);
-    int (*real)(Record *, unsigned) = nullptr;
-    static_assert(sizeof(real) == sizeof(symbol));
-    std::memcpy(&real, &symbol, sizeof(real));
-    return real(record, version);
+    return vclink::test::findNext<int(Record *, unsigned)>(name)(record, version);
 }
 
 } // namespace

@@ -4,9 +4,7 @@
 /// for the file of known hosts. What it calls of libssh2 right before and right after stands here,
 /// in the program, which is found first: what is allocated in between is not held against anybody.
 /// A suppression would have to name libgit2 as a whole, which hides what the library forgets.
-#include <cstdlib>
-
-#include <dlfcn.h>
+#include "support/interposition.hpp"
 
 // There are none without the leak sanitizer.
 extern "C" __attribute__((weak)) void disableLeakCheck() __asm__("__lsan_disable");
@@ -41,19 +39,11 @@ void enable()
     }
 }
 
-template <class Function> Function *findReal(const char *name)
-{
-    void *const symbol = ::dlsym(RTLD_NEXT, name);
-    if (symbol == nullptr)
-        std::abort();
-    return reinterpret_cast<Function *>(symbol);
-}
-
 } // namespace
 
 extern "C" void *makeSession(void *allocate, void *release, void *reallocate, void *abstract)
 {
-    void *const session = findReal<void *(void *, void *, void *, void *)>(
+    void *const session = vclink::test::findNext<void *(void *, void *, void *, void *)>(
         "libssh2_session_init_ex")(allocate, release, reallocate, abstract);
     if (session != nullptr)
         disable();
@@ -63,5 +53,5 @@ extern "C" void *makeSession(void *allocate, void *release, void *reallocate, vo
 extern "C" void *makeKnownHosts(void *session)
 {
     enable();
-    return findReal<void *(void *)>("libssh2_knownhost_init")(session);
+    return vclink::test::findNext<void *(void *)>("libssh2_knownhost_init")(session);
 }

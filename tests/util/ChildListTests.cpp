@@ -4,13 +4,13 @@
 #include <cerrno>
 #include <cstdlib>
 
-#include <dlfcn.h>
 #include <fcntl.h>
 #include <gtest/gtest.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
-#include "NothingLeft.hpp"
+#include "support/NothingLeft.hpp"
+#include "support/interposition.hpp"
 #include "util/StartGuard.hpp"
 
 namespace
@@ -24,8 +24,7 @@ int failingReads = 0;
 
 extern "C" ssize_t read(int descriptor, void *buffer, size_t size)
 {
-    using Read = ssize_t(int, void *, size_t);
-    static Read *const realRead = reinterpret_cast<Read *>(::dlsym(RTLD_NEXT, "read"));
+    static auto *const realRead = vclink::test::findNext<ssize_t(int, void *, size_t)>("read");
     if (failingReads == 0)
         return realRead(descriptor, buffer, size);
     --failingReads;

@@ -8,8 +8,8 @@
 #include <sys/wait.h>
 #include <unistd.h>
 
-#include "NothingLeft.hpp"
-#include "SignalAction.hpp"
+#include "support/NothingLeft.hpp"
+#include "support/SignalAction.hpp"
 #include "util/ChildStatus.hpp"
 
 namespace

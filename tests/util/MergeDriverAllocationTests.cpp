@@ -10,9 +10,9 @@
 #include <git2/sys/merge.h>
 #include <gtest/gtest.h>
 
-#include "../main/FailingAllocations.hpp"
 #include "MergeDriverTest.hpp"
 #include "error/errorUtil/callbackException.hpp"
+#include "support/FailingAllocations.hpp"
 #include "vclink/git/LibGit2Guard.hpp"
 
 namespace

@@ -1,22 +1,12 @@
 // SPDX-License-Identifier: MIT
 #include "MergeDriverCalls.hpp"
 
-#include <stdexcept>
-
-#include <dlfcn.h>
+#include "support/interposition.hpp"
 
 namespace
 {
 
 vclink::test::MergeDriverCalls *current = nullptr;
-
-template <class Function> Function *findReal(const char *name)
-{
-    void *const symbol = ::dlsym(RTLD_NEXT, name);
-    if (symbol == nullptr)
-        throw std::runtime_error(name);
-    return reinterpret_cast<Function *>(symbol);
-}
 
 void note(const char *name)
 {
@@ -50,6 +40,7 @@ MergeDriverCalls::~MergeDriverCalls()
 
 } // namespace vclink::test
 
+using vclink::test::findNext;
 using vclink::test::MergeDriverCalls;
 
 const git_index_entry *git_merge_driver_source_ancestor(const git_merge_driver_source *)
@@ -87,7 +78,7 @@ int git_repository_config_snapshot(git_config **out, git_repository *repository)
     note("config_snapshot");
     if (answers(&MergeDriverCalls::onSnapshot))
         return current->onSnapshot();
-    return findReal<decltype(git_repository_config_snapshot)>("git_repository_config_snapshot")(
+    return findNext<decltype(git_repository_config_snapshot)>("git_repository_config_snapshot")(
         out, repository);
 }
 
@@ -96,25 +87,25 @@ int git_config_get_entry(git_config_entry **out, const git_config *config, const
     note("get_entry");
     if (answers(&MergeDriverCalls::onGetEntry))
         return current->onGetEntry();
-    return findReal<decltype(git_config_get_entry)>("git_config_get_entry")(out, config, name);
+    return findNext<decltype(git_config_get_entry)>("git_config_get_entry")(out, config, name);
 }
 
 void git_config_entry_free(git_config_entry *entry)
 {
     note("entry_free");
-    findReal<decltype(git_config_entry_free)>("git_config_entry_free")(entry);
+    findNext<decltype(git_config_entry_free)>("git_config_entry_free")(entry);
 }
 
 void git_config_free(git_config *config)
 {
     note("config_free");
-    findReal<decltype(git_config_free)>("git_config_free")(config);
+    findNext<decltype(git_config_free)>("git_config_free")(config);
 }
 
 int git_repository_odb(git_odb **out, git_repository *repository)
 {
     note("odb");
-    return findReal<decltype(git_repository_odb)>("git_repository_odb")(out, repository);
+    return findNext<decltype(git_repository_odb)>("git_repository_odb")(out, repository);
 }
 
 int git_odb_read(git_odb_object **out, git_odb *database, const git_oid *id)
@@ -126,19 +117,19 @@ int git_odb_read(git_odb_object **out, git_odb *database, const git_oid *id)
         if (code != 0)
             return code;
     }
-    return findReal<decltype(git_odb_read)>("git_odb_read")(out, database, id);
+    return findNext<decltype(git_odb_read)>("git_odb_read")(out, database, id);
 }
 
 void git_odb_object_free(git_odb_object *object)
 {
     note("object_free");
-    findReal<decltype(git_odb_object_free)>("git_odb_object_free")(object);
+    findNext<decltype(git_odb_object_free)>("git_odb_object_free")(object);
 }
 
 void git_odb_free(git_odb *database)
 {
     note("odb_free");
-    findReal<decltype(git_odb_free)>("git_odb_free")(database);
+    findNext<decltype(git_odb_free)>("git_odb_free")(database);
 }
 
 int git_buf_set(git_buf *buffer, const void *data, size_t size)
@@ -146,7 +137,7 @@ int git_buf_set(git_buf *buffer, const void *data, size_t size)
     note("buf_set");
     if (answers(&MergeDriverCalls::onSetBuffer))
         return current->onSetBuffer();
-    return findReal<decltype(git_buf_set)>("git_buf_set")(buffer, data, size);
+    return findNext<decltype(git_buf_set)>("git_buf_set")(buffer, data, size);
 }
 
 int git_merge_driver_register(const char *name, git_merge_driver *driver)
@@ -154,7 +145,7 @@ int git_merge_driver_register(const char *name, git_merge_driver *driver)
     note("register");
     if (answers(&MergeDriverCalls::onRegister))
         return current->onRegister();
-    return findReal<decltype(git_merge_driver_register)>("git_merge_driver_register")(name, driver);
+    return findNext<decltype(git_merge_driver_register)>("git_merge_driver_register")(name, driver);
 }
 
 int git_merge_driver_unregister(const char *name)
@@ -162,17 +153,17 @@ int git_merge_driver_unregister(const char *name)
     note("unregister");
     if (answers(&MergeDriverCalls::onUnregister))
         return current->onUnregister();
-    return findReal<decltype(git_merge_driver_unregister)>("git_merge_driver_unregister")(name);
+    return findNext<decltype(git_merge_driver_unregister)>("git_merge_driver_unregister")(name);
 }
 
 int git_libgit2_init()
 {
     note("init");
-    return findReal<decltype(git_libgit2_init)>("git_libgit2_init")();
+    return findNext<decltype(git_libgit2_init)>("git_libgit2_init")();
 }
 
 int git_libgit2_shutdown()
 {
     note("shutdown");
-    return findReal<decltype(git_libgit2_shutdown)>("git_libgit2_shutdown")();
+    return findNext<decltype(git_libgit2_shutdown)>("git_libgit2_shutdown")();
 }

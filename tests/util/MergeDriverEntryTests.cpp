@@ -16,13 +16,13 @@
 #include <gtest/gtest.h>
 
 #include "MergeDriverCalls.hpp"
-#include "NothingLeft.hpp"
-#include "Scripts.hpp"
 #include "error/errorUtil/GitResult.hpp"
 #include "error/errorUtil/callbackException.hpp"
 #include "support/GitTest.hpp"
 #include "support/LibGit2Session.hpp"
 #include "support/LogCapture.hpp"
+#include "support/NothingLeft.hpp"
+#include "support/Scripts.hpp"
 #include "util/GitMergeDriverLookup.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
 #include "vclink/git/LibGit2Guard.hpp"

@@ -13,8 +13,8 @@
 #include <gtest/gtest.h>
 
 #include "MergeDriverTest.hpp"
-#include "SignalAction.hpp"
 #include "error/errorUtil/callbackException.hpp"
+#include "support/SignalAction.hpp"
 #include "util/processError.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
 

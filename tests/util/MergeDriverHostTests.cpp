@@ -10,7 +10,7 @@
 #include <gtest/gtest.h>
 
 #include "MergeDriverTest.hpp"
-#include "SignalAction.hpp"
+#include "support/SignalAction.hpp"
 #include "support/ThousandDescriptors.hpp"
 #include "support/UnprivilegedUser.hpp"
 #include "support/WorkingFolder.hpp"

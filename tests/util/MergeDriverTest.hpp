@@ -5,12 +5,12 @@
 #include <string>
 #include <vector>
 
-#include "NothingLeft.hpp"
-#include "Scripts.hpp"
 #include "error/errorUtil/GitDeleters.hpp"
 #include "support/GitTest.hpp"
 #include "support/LibGit2Session.hpp"
 #include "support/LogCapture.hpp"
+#include "support/NothingLeft.hpp"
+#include "support/Scripts.hpp"
 #include "util/GitMergeDriverLookup.hpp"
 
 namespace vclink::test

@@ -14,8 +14,8 @@
 #include <sys/wait.h>
 #include <unistd.h>
 
-#include "DescriptorLimit.hpp"
 #include "RunCommandTest.hpp"
+#include "support/DescriptorLimit.hpp"
 #include "support/LogCapture.hpp"
 #include "support/UnprivilegedUser.hpp"
 #include "util/processError.hpp"

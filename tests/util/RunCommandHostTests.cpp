@@ -17,9 +17,9 @@
 #include <unistd.h>
 
 #include "RunCommandTest.hpp"
-#include "SignalAction.hpp"
 #include "support/Command.hpp"
 #include "support/LogCapture.hpp"
+#include "support/SignalAction.hpp"
 #include "support/ThousandDescriptors.hpp"
 #include "support/WorkingFolder.hpp"
 #include "util/processError.hpp"

@@ -6,9 +6,9 @@
 #include <system_error>
 #include <vector>
 
-#include "NothingLeft.hpp"
-#include "Scripts.hpp"
 #include "support/GitTest.hpp"
+#include "support/NothingLeft.hpp"
+#include "support/Scripts.hpp"
 
 namespace vclink::test
 {

@@ -15,7 +15,7 @@
 #include <sys/socket.h>
 #include <unistd.h>
 
-#include "SignalAction.hpp"
+#include "support/SignalAction.hpp"
 
 namespace vclink::git
 {

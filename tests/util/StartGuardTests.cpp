@@ -13,8 +13,8 @@
 #include <sys/wait.h>
 #include <unistd.h>
 
-#include "DescriptorLimit.hpp"
-#include "NothingLeft.hpp"
+#include "support/DescriptorLimit.hpp"
+#include "support/NothingLeft.hpp"
 #include "util/StartGuard.hpp"
 
 namespace

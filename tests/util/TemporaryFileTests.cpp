@@ -11,13 +11,13 @@
 #include <sys/resource.h>
 #include <sys/stat.h>
 
-#include "NothingLeft.hpp"
-#include "Scripts.hpp"
-#include "SignalAction.hpp"
 #include "error/errorUtil/GitResult.hpp"
 #include "support/GitTest.hpp"
 #include "support/LibGit2Session.hpp"
 #include "support/LogCapture.hpp"
+#include "support/NothingLeft.hpp"
+#include "support/Scripts.hpp"
+#include "support/SignalAction.hpp"
 #include "support/text.hpp"
 #include "util/temporaryFile.hpp"
 #include "vclink/git/LibGit2Exception.hpp"

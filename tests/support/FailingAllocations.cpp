@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-#include "FailingAllocations.hpp"
+#include "support/FailingAllocations.hpp"
 
 #include <cstddef>
 #include <cstdlib>

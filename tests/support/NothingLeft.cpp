@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-#include "NothingLeft.hpp"
+#include "support/NothingLeft.hpp"
 
 #include <cerrno>
 #include <utility>

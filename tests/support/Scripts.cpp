@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-#include "Scripts.hpp"
+#include "support/Scripts.hpp"
 
 #include <cerrno>
 #include <fstream>
