@@ -10,6 +10,7 @@ from programs import Ratios
 from report import Table
 
 ROUNDS = 7
+DRIVER_ROUNDS = 21  # a verdict depends on them
 FILES = 4_000
 CHANGED = 1_000
 IN_COMMON = 100
@@ -132,9 +133,9 @@ class BranchBench:
                 for operation in self._operations if not operation.driver}
 
     def _count(self, operation):
-        return {program: self._programs.median_instructions(
-            f"branch_{program}", *operation.arguments, before=operation.put_back)
-            for program in ("floor", "library")}
+        return self._programs.count_in_turn(
+            {program: (f"branch_{program}", *operation.arguments)
+             for program in ("floor", "library")}, before=operation.put_back)
 
     def clock(self):
         self._rounds = {}
@@ -146,7 +147,8 @@ class BranchBench:
             self._rounds[operation.title] = self._programs.clock(
                 [("branch_floor", *operation.arguments), ("branch_library", *operation.arguments),
                  ("branch_floor", "child", *operation.arguments)],
-                ROUNDS, before=operation.put_back, added=added)
+                DRIVER_ROUNDS if operation.limit and operation.driver else ROUNDS,
+                before=operation.put_back, added=added)
 
     def table(self, counted):
         table = Table("Branches", "instructions, floor", "library", "library ÷ floor",

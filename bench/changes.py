@@ -84,11 +84,11 @@ class ChangeBench:
                 for change in self._changes}
 
     def _count(self, change):
-        counted = {}
-        for program in ("floor", "library"):
-            command = (f"change_{program}", *change.arguments)
-            counted["instructions", program] = self._programs.median_instructions(
-                *command, before=change.put_back)
+        commands = {program: (f"change_{program}", *change.arguments)
+                    for program in ("floor", "library")}
+        instructions = self._programs.count_in_turn(commands, before=change.put_back)
+        counted = {("instructions", program): count for program, count in instructions.items()}
+        for program, command in commands.items():
             change.put_back()
             counted["allocations", program] = self._programs.allocations(*command)
         return counted

@@ -12,7 +12,7 @@ import sys
 import working_copies
 from branches import BranchBench
 from changes import ChangeBench
-from programs import Programs, Ratios
+from programs import COUNTS, Programs, Ratios
 from remotes import RemoteBench
 from report import Table, write_into
 
@@ -94,13 +94,9 @@ class Bench:
             ("probe", "guarded"): lambda: programs.instructions("library", "probe", some),
             ("probe", "alone"): lambda: programs.instructions("library", "probe-alone", some),
         }
+        for size, count in reversed(self._lists()):
+            tasks["files", size, count] = lambda s=size, c=count: self._count_list(s, c)
         for program in ("floor", "library"):
-            for size, count in reversed(self._lists()):
-                arguments = (program, "files", self._roots[size], self._list(size, count))
-                run = (programs.median_instructions
-                       if size * count <= MOST_COMPARISONS_COUNTED_OFTEN
-                       else programs.instructions)
-                tasks["files", program, size, count] = lambda r=run, a=arguments: r(*a)
             for size, root in self._roots.items():
                 arguments = (program, "folder", root)
                 tasks["folder", program, size] = lambda a=arguments: programs.instructions(*a)
@@ -109,6 +105,12 @@ class Bench:
         with concurrent.futures.ThreadPoolExecutor(os.cpu_count()) as pool:
             running = {key: pool.submit(task) for key, task in tasks.items()}
             self._counted = {key: task.result() for key, task in running.items()}
+
+    def _count_list(self, size, count):
+        often = size * count <= MOST_COMPARISONS_COUNTED_OFTEN
+        return self._programs.count_in_turn(
+            {program: (program, "files", self._roots[size], self._list(size, count))
+             for program in ("floor", "library")}, COUNTS if often else 1)
 
     def clock(self):
         """Times floor, library and git as a child process, nothing else running."""
@@ -174,8 +176,8 @@ class Bench:
         table = Table("`getFileStates`", "instructions, floor", "library", "library ÷ floor",
                       "time, library ÷ floor")
         for size, count in self._lists():
-            floor = self._counted["files", "floor", size, count]
-            library = self._counted["files", "library", size, count]
+            floor = self._counted["files", size, count]["floor"]
+            library = self._counted["files", size, count]["library"]
             table.row(f"{count:,} of {size:,} files", [
                 f"{floor:,}", f"{library:,}", f"{library / floor:.4f}",
                 str(Ratios(self._rounds[size, count], 1, 0))],

@@ -34,14 +34,16 @@ class Programs:
         pairs = (line.split() for line in done.stdout.splitlines())
         return {name: int(value) for name, value in pairs}
 
-    def median_instructions(self, program, *arguments, before=lambda: None):
-        """How many instructions the region usually takes. Calls `before` before each run."""
-        counts = []
-        for number in range(COUNTS):
-            before()
-            counts.append(self.instructions(program, *arguments,
-                                            displacement=number * DISPLACEMENT))
-        return statistics.median(counts)
+    def count_in_turn(self, commands, counts=COUNTS, before=lambda: None):
+        """How many instructions the region of each command usually takes: {name: median}. Calls
+        `before` before each run."""
+        counted = {name: [] for name in commands}
+        for number in range(counts):
+            for name, command in commands.items():
+                before()
+                counted[name].append(
+                    self.instructions(*command, displacement=number * DISPLACEMENT))
+        return {name: statistics.median(numbers) for name, numbers in counted.items()}
 
     def instructions(self, program, *arguments, displacement=0):
         """How many instructions callgrind counts in the region, with the heap moved by so many
