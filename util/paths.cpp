@@ -24,6 +24,20 @@ bool isName(std::string_view element)
     return !element.empty() && element != "." && element != "..";
 }
 
+/// A separator at the end is kept by Boost 1.81. Boost 1.74 leaves it out where the path exists,
+/// and puts "." behind it elsewhere: so it is here with every release.
+fs::path canonical(const fs::path &path)
+{
+    fs::path result = fs::weakly_canonical(path);
+    const std::string &text = result.native();
+    if (text.size() < 2 || text.back() != '/')
+    {
+        return result;
+    }
+    boost::system::error_code ignored;
+    return fs::exists(path, ignored) ? fs::path(text.substr(0, text.size() - 1)) : result / ".";
+}
+
 /// A path cut into a folder that is given without "." and "..", and a name in it: the two can be
 /// resolved one after the other. No folder where the path can't be cut so.
 struct NameInFolder
@@ -89,7 +103,7 @@ void appendAsciiName(ustring &text, std::string_view name, bool native)
 } // namespace
 
 RootRelativePaths::RootRelativePaths(const upath &root)
-    : given_(fl::i18n::ustring_to_utf8(root.string())), root_(fs::weakly_canonical(given_))
+    : given_(fl::i18n::ustring_to_utf8(root.string())), root_(canonical(given_))
 {
 }
 
@@ -107,7 +121,7 @@ std::string RootRelativePaths::resolve(const std::string &path)
         folder.empty() ? FolderBelowRoot() : findFolder(std::string(folder));
     if (!below || fs::is_symlink(fs::symlink_status(path)))
     {
-        return fs::weakly_canonical(path).lexically_relative(root_).string();
+        return canonical(path).lexically_relative(root_).string();
     }
     return (*below == "." ? std::string() : *below + '/').append(name);
 }
@@ -122,8 +136,7 @@ const RootRelativePaths::FolderBelowRoot &RootRelativePaths::findFolder(const st
     // Step by step only from the root on: above it nothing would be found below it.
     const bool isGivenBelow = folder.size() > given_.size() && folder.rfind(given_ + '/', 0) == 0;
     const std::string relative =
-        isGivenBelow ? resolve(folder)
-                     : fs::weakly_canonical(folder).lexically_relative(root_).string();
+        isGivenBelow ? resolve(folder) : canonical(folder).lexically_relative(root_).string();
     const bool isBelow = !relative.empty() && relative != ".." && relative.rfind("../", 0) != 0;
     return folders_.emplace(folder, FolderBelowRoot(isBelow, relative)).first->second;
 }

@@ -20,6 +20,7 @@ namespace
 
 using testing::ElementsAre;
 using testing::IsEmpty;
+using testing::StartsWith;
 using vclink::git::makeFallbackSignature;
 using vclink::test::HostName;
 using vclink::test::NothingChanges;
@@ -192,8 +193,9 @@ TEST_F(FallbackSignature, RaisesTheReasonForWhichTheHostsNameFails)
         {
             EXPECT_EQ(exception.code().value(), error);
             EXPECT_EQ(exception.code().category(), boost::system::system_category());
-            // Nothing of its own stands before the reason.
-            EXPECT_EQ(exception.what(), exception.code().message());
+            // Nothing of its own stands before the reason; later releases of Boost tell the code
+            // behind it.
+            EXPECT_THAT(exception.what(), StartsWith(exception.code().message()));
         }
     }
 }
