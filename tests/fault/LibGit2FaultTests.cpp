@@ -23,7 +23,6 @@ namespace
 {
 
 using vclink::test::FaultSite;
-using vclink::test::LibGit2Fault;
 using vclink::test::LibGit2Faults;
 using vclink::test::outcomeOf;
 using vclink::test::When;

@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "BranchCalls.hpp"
 
-#include <cstring>
+#include <tuple>
 
 #include <git2/sys/merge.h>
 
@@ -73,11 +73,18 @@ void noteCheckout(const git_checkout_options *options)
     current->checkoutPaths.push_back(paths);
 }
 
+auto membersOf(const git_merge_options &options)
+{
+    return std::tie(options.version, options.flags, options.rename_threshold, options.target_limit,
+                    options.metric, options.recursion_limit, options.default_driver,
+                    options.file_favor, options.file_flags);
+}
+
 void noteMergeOptions(const git_merge_options *options)
 {
     git_merge_options initial;
     git_merge_options_init(&initial, GIT_MERGE_OPTIONS_VERSION);
-    if (isWatched() && std::memcmp(&initial, options, sizeof(initial)) != 0)
+    if (isWatched() && membersOf(initial) != membersOf(*options))
         ++current->changedMergeOptions;
 }
 

@@ -20,7 +20,6 @@ namespace
 namespace fs = std::filesystem;
 using vclink::test::NothingLeft;
 using vclink::test::NoWorkingFolder;
-using vclink::test::Scripts;
 using vclink::test::SignalAction;
 using vclink::test::ThousandDescriptors;
 

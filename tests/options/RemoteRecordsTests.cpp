@@ -85,7 +85,6 @@ namespace
 
 using test::LogCapture;
 using testing::ElementsAre;
-using testing::HasSubstr;
 using testing::IsEmpty;
 using testing::StartsWith;
 using vclink::util::exception::CancelledOperationException;
@@ -225,16 +224,17 @@ TEST_F(ToGitRemoteCallbacks, TracesEachOfTheTenUnderItsOwnName)
     // It names the callback's arguments only.
     EXPECT_EQ(log.messages().size(), 10u);
 #else
-    EXPECT_THAT(log.messages(), ElementsAre(HasSubstr("RemoteCallbacks::sidebandProgress"),
-                                            HasSubstr("RemoteCallbacks::completion"),
-                                            HasSubstr("RemoteCallbacks::credentials"),
-                                            HasSubstr("RemoteCallbacks::certificateCheck"),
-                                            HasSubstr("RemoteCallbacks::transferProgress"),
-                                            HasSubstr("RemoteCallbacks::updateTips"),
-                                            HasSubstr("RemoteCallbacks::packProgress"),
-                                            HasSubstr("RemoteCallbacks::pushTransferProgress"),
-                                            HasSubstr("RemoteCallbacks::pushUpdateReference"),
-                                            HasSubstr("RemoteCallbacks::pushNegotiation")));
+    EXPECT_THAT(log.messages(),
+                ElementsAre(testing::HasSubstr("RemoteCallbacks::sidebandProgress"),
+                            testing::HasSubstr("RemoteCallbacks::completion"),
+                            testing::HasSubstr("RemoteCallbacks::credentials"),
+                            testing::HasSubstr("RemoteCallbacks::certificateCheck"),
+                            testing::HasSubstr("RemoteCallbacks::transferProgress"),
+                            testing::HasSubstr("RemoteCallbacks::updateTips"),
+                            testing::HasSubstr("RemoteCallbacks::packProgress"),
+                            testing::HasSubstr("RemoteCallbacks::pushTransferProgress"),
+                            testing::HasSubstr("RemoteCallbacks::pushUpdateReference"),
+                            testing::HasSubstr("RemoteCallbacks::pushNegotiation")));
 #endif
 }
 
