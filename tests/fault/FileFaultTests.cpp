@@ -18,11 +18,11 @@
 
 #include "FailingFiles.hpp"
 #include "FaultTest.hpp"
-#include "LibGit2Faults.hpp"
 #include "differential/expectedStates.hpp"
 #include "differential/moves.hpp"
 #include "error/errorUtil/callbackException.hpp"
 #include "support/NothingLeft.hpp"
+#include "support/libgit2/LibGit2Recorder.hpp"
 #include "support/text.hpp"
 
 namespace
@@ -115,11 +115,12 @@ class FailingFileCall : public vclink::test::FaultTest
         {
             const vclink::test::NothingLeft nothingLeft(environment().temporary());
             {
-                const vclink::test::LibGit2Faults noting;
+                using vclink::test::LibGit2Recorder;
+                const LibGit2Recorder recorder(LibGit2Recorder::InCallbacks::Followed);
                 const FailingFiles failing(call, error);
                 outcome = outcomeOf(action);
                 function = failing.failed();
-                EXPECT_EQ(noting.openHandles(), std::vector<std::string>());
+                EXPECT_EQ(recorder.openHandles(), std::vector<std::string>());
             }
             trial_.closeWhatLibGit2Leaves();
             if (GetParam().name == "mergeByTool")

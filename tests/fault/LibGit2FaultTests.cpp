@@ -14,16 +14,16 @@
 #include <gtest/gtest.h>
 
 #include "FaultTest.hpp"
-#include "LibGit2Faults.hpp"
 #include "error/errorUtil/callbackException.hpp"
 #include "expectedOutcomes.hpp"
 #include "support/NothingLeft.hpp"
+#include "support/libgit2/LibGit2Recorder.hpp"
 
 namespace
 {
 
 using vclink::test::FaultSite;
-using vclink::test::LibGit2Faults;
+using vclink::test::LibGit2Recorder;
 using vclink::test::outcomeOf;
 using vclink::test::When;
 
@@ -33,7 +33,7 @@ constexpr std::array<int, 6> codes{GIT_ERROR,    GIT_ENOTFOUND,      GIT_EUSER,
 
 std::string nameOf(const FaultSite &site)
 {
-    return site.function + " (" + std::to_string(site.occurrence) + ") " +
+    return site.fault.function + " (" + std::to_string(site.fault.call) + ") " +
            (site.fault.when == When::Before ? "before" : "after") + " with " +
            std::to_string(site.fault.code);
 }
@@ -45,15 +45,15 @@ class FailingLibGit2Call : public vclink::test::FaultTest
     std::vector<FaultSite> findSites()
     {
         const auto action = trial_.begin();
-        const LibGit2Faults noting;
+        const LibGit2Recorder recorder(LibGit2Recorder::InCallbacks::Followed);
         outcomeOf(action);
-        std::map<std::string, int> occurrences;
+        std::map<std::string, std::size_t> counts;
         std::vector<FaultSite> sites;
-        for (const auto &function : noting.calls())
-            sites.push_back({GetParam().name,
-                             function,
-                             ++occurrences[function],
-                             {sites.size() + 1, 0, When::Before}});
+        for (const auto &call : recorder.calls())
+        {
+            if (call.givesCode)
+                sites.push_back({GetParam().name, {call.name, 0, ++counts[call.name]}});
+        }
         return sites;
     }
 
@@ -64,16 +64,17 @@ class FailingLibGit2Call : public vclink::test::FaultTest
         std::string outcome;
         {
             const vclink::test::NothingLeft nothingLeft(environment().temporary());
-            const LibGit2Faults faults(site.fault);
+            LibGit2Recorder recorder(LibGit2Recorder::InCallbacks::Followed);
+            recorder.fail({site.fault});
             outcome = outcomeOf(action);
-            EXPECT_EQ(faults.openHandles(), std::vector<std::string>());
-            EXPECT_EQ(faults.starts(), 0);
+            EXPECT_EQ(recorder.openHandles(), std::vector<std::string>());
+            EXPECT_EQ(recorder.starts(), 0);
         }
         EXPECT_EQ(outcome, vclink::test::expectedOutcome(site, trial_.normalOutcome()));
         // The codes differ in what comes out, hardly in what is left.
         if (site.fault.code == codes.front() || vclink::test::wantsAllFaults())
             trial_.expectSound();
-        if (vclink::test::isUnexamined(site.operation, site.function))
+        if (vclink::test::isUnexamined(site.operation, site.fault.function))
         {
             EXPECT_EQ(trial_.gist(), trial_.normalGist());
         }
@@ -89,7 +90,7 @@ TEST_P(FailingLibGit2Call, ComesOutAndLeavesNothing)
     {
         for (const auto when : {When::Before, When::After})
         {
-            if (when == When::Before && vclink::test::isUnexamined(site.operation, site.function))
+            if (when == When::Before && vclink::test::isUnexamined(site.operation, site.fault.function))
                 continue;
             for (const int code : codes)
             {
@@ -116,9 +117,10 @@ TEST_F(LibGit2Functions, AreAllCalledByTheOperations)
     {
         vclink::test::Trial trial(operation, folder() / operation.name, environment());
         const auto action = trial.begin();
-        const LibGit2Faults noting;
+        const LibGit2Recorder recorder(LibGit2Recorder::InCallbacks::Followed);
         outcomeOf(action);
-        called.insert(noting.functions().begin(), noting.functions().end());
+        const auto names = recorder.names();
+        called.insert(names.begin(), names.end());
     }
     std::vector<std::string> notCalled;
     const auto imported = vclink::test::wrappedFunctions();

@@ -27,7 +27,7 @@ struct Tolerance
     std::string operations;
     std::string function;
     /// which of the function's calls, and with which code
-    int occurrence = any;
+    std::size_t call = any;
     int code = any;
     std::string outcome;
 };
@@ -192,7 +192,7 @@ bool isUnexamined(const std::string &operation, const std::string &function)
 
 std::string expectedOutcome(const FaultSite &site, const std::string &normal)
 {
-    if (isUnexamined(site.operation, site.function))
+    if (isUnexamined(site.operation, site.fault.function))
         return normal;
     const auto tolerances = tolerancesOf(site.operation, normal);
     const auto found = std::find_if(
@@ -200,8 +200,8 @@ std::string expectedOutcome(const FaultSite &site, const std::string &normal)
         [&site](const Tolerance &tolerance)
         {
             return begins(site.operation, tolerance.operations) &&
-                   site.function == tolerance.function &&
-                   (tolerance.occurrence == any || tolerance.occurrence == site.occurrence) &&
+                   site.fault.function == tolerance.function &&
+                   (tolerance.call == any || tolerance.call == site.fault.call) &&
                    (tolerance.code == any || tolerance.code == site.fault.code);
         });
     return found != tolerances.end()

@@ -3,18 +3,15 @@
 
 #include <string>
 
-#include "LibGit2Faults.hpp"
+#include "support/libgit2/LibGit2Recorder.hpp"
 
 namespace vclink::test
 {
 
-/// One fault, and what it hits.
+/// One call of an operation that fails.
 struct FaultSite
 {
     std::string operation;
-    /// the function of libgit2, and the how manieth call of it in the operation
-    std::string function;
-    int occurrence = 0;
     LibGit2Fault fault;
 };
 

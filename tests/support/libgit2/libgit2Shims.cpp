@@ -1,18 +1,32 @@
 // SPDX-License-Identifier: MIT
+#include <optional>
 #include <string>
 #include <string_view>
 #include <type_traits>
 #include <vector>
 
 #include <git2.h>
+#include <git2/sys/commit.h>
+#include <git2/sys/config.h>
+#include <git2/sys/filter.h>
+#include <git2/sys/index.h>
 #include <git2/sys/merge.h>
+#include <git2/sys/odb_backend.h>
+#include <git2/sys/path.h>
+#include <git2/sys/refs.h>
+#include <git2/sys/repository.h>
+#include <git2/sys/stream.h>
+#include <git2/sys/transport.h>
 
-#include "LibGit2Faults.hpp"
+#include "Passing.hpp"
 
 namespace
 {
 
-using vclink::test::LibGit2Faults;
+using vclink::test::LibGit2Fault;
+using vclink::test::When;
+using vclink::test::detail::Hooks;
+using vclink::test::detail::Passing;
 
 /// What a function gives out through its first argument for the caller to release.
 template <class First> const void *givenOut(First /*first*/)
@@ -37,6 +51,16 @@ const void *givenOut(First first, Second /*second*/, Others... /*others*/)
     return givenOut(first);
 }
 
+/// What a function releases.
+template <class Handle> const void *takenBack(Handle *handle)
+{
+    return handle;
+}
+template <class... Arguments> const void *takenBack(Arguments... /*arguments*/)
+{
+    return nullptr;
+}
+
 bool isRelease(std::string_view function)
 {
     constexpr std::string_view ending = "_free";
@@ -44,60 +68,52 @@ bool isRelease(std::string_view function)
            function.substr(function.size() - ending.size()) == ending;
 }
 
-template <class Handle> void takeBack(const char *function, Handle *handle)
-{
-    if (handle != nullptr && isRelease(function))
-        LibGit2Faults::takeBack(function, handle);
-}
-template <class... Arguments> void takeBack(const char * /*function*/, Arguments... /*arguments*/)
-{
-}
-
 /// What stands for a function of libgit2.
 template <class Function> struct Shim;
 template <class Result, class... Arguments> struct Shim<Result(Arguments...)>
 {
+    using Real = Result (*)(Arguments...);
+    using Hook = typename Hooks<Result(Arguments...)>::Hook;
+    using Answer = typename Hooks<Result(Arguments...)>::Answer;
     static constexpr bool givesCode = std::is_same_v<Result, int>;
 
     /// The same function with another body for each of the functions of one type.
-    template <Result (*Real)(Arguments...), const char *const *Name>
-    static Result call(Arguments... arguments)
+    template <Real real, const char *const *name> static Result call(Arguments... arguments)
     {
-        const LibGit2Faults::Call call = LibGit2Faults::begin(*Name, givesCode);
-        if constexpr (std::is_void_v<Result>)
-        {
-            if (call.isNoted)
-                takeBack(*Name, arguments...);
-            Real(arguments...);
-        }
-        else if constexpr (givesCode)
-        {
-            return callForCode<Real>(call, *Name, arguments...);
-        }
+        const Passing passing(*name);
+        if (!passing.isFollowed())
+            return real(arguments...);
+        const bool releases = std::is_void_v<Result> && isRelease(*name);
+        passing.note(givesCode, releases, releases ? takenBack(arguments...) : nullptr);
+        passing.tell<Hook>(arguments...);
+        if constexpr (givesCode)
+            return callForCode(passing, real, arguments...);
         else
-        {
-            return Real(arguments...);
-        }
+            return answer(passing, real, arguments...);
     }
 
   private:
-    template <Result (*Real)(Arguments...)>
-    static Result callForCode(const LibGit2Faults::Call &call, const char *name,
-                              Arguments... arguments)
+    static int callForCode(const Passing &passing, Real real, Arguments... arguments)
     {
-        if (call.failsBefore)
+        const std::optional<LibGit2Fault> fault = passing.fault();
+        int code = 0;
+        if (!fault || fault->when == When::After)
         {
-            LibGit2Faults::fail();
-            return call.code;
+            code = answer(passing, real, arguments...);
+            const void *const handle = givenOut(arguments...);
+            if (handle != nullptr)
+                passing.giveOut(handle);
         }
-        const int code = Real(arguments...);
-        const void *const handle = call.isNoted ? givenOut(arguments...) : nullptr;
-        if (handle != nullptr)
-            LibGit2Faults::giveOut(name, handle);
-        if (!call.failsAfter)
+        if (!fault)
             return code;
-        LibGit2Faults::fail();
-        return call.code;
+        Passing::setError();
+        return fault->code;
+    }
+    /// The test's answer, or libgit2's.
+    static Result answer(const Passing &passing, Real real, Arguments... arguments)
+    {
+        const auto instead = passing.answer<Answer>();
+        return instead != nullptr ? (*instead)(real, arguments...) : real(arguments...);
     }
 };
 
