@@ -3,8 +3,11 @@
 
 #include <fstream>
 #include <iterator>
+#include <map>
 #include <stdexcept>
 #include <utility>
+
+#include "support/TemporaryFolder.hpp"
 
 namespace vclink::test
 {
@@ -36,12 +39,82 @@ Command makeCommand(const std::vector<std::string> &arguments)
     return Command(std::move(all));
 }
 
+std::string readFile(const std::filesystem::path &file)
+{
+    std::ifstream stream(file, std::ios::binary);
+    if (!stream)
+        throw std::runtime_error("can't read " + file.string());
+    return {std::istreambuf_iterator<char>(stream), {}};
+}
+
+void writeFile(const std::filesystem::path &file, const std::string &bytes)
+{
+    std::ofstream stream(file, std::ios::binary | std::ios::trunc);
+    stream << bytes << std::flush;
+    if (!stream)
+        throw std::runtime_error("can't write " + file.string());
+}
+
+std::string withoutLineFeed(std::string text)
+{
+    if (!text.empty() && text.back() == '\n')
+        text.pop_back();
+    return text;
+}
+
+/// The folders and files that git makes of a new repository.
+struct NewRepository
+{
+    std::vector<std::filesystem::path> folders;
+    std::map<std::filesystem::path, std::string> files;
+};
+
+NewRepository askGitForNewRepository()
+{
+    namespace fs = std::filesystem;
+    const TemporaryFolder folder;
+    runOrThrow(makeCommand({"init", "--quiet", "--template=", "--initial-branch=main", "."})
+                   .in(folder.path())
+                   .environment("HOME", folder.path())
+                   .environment("XDG_CONFIG_HOME", folder.path()));
+    NewRepository made;
+    for (const auto &entry : fs::recursive_directory_iterator(folder.path()))
+    {
+        const auto name = entry.path().lexically_relative(folder.path());
+        if (entry.is_directory())
+            made.folders.push_back(name);
+        else
+            made.files.emplace(name, readFile(entry.path()));
+    }
+    return made;
+}
+
+/// The id of the commit at HEAD, which was just made, so that its reference is a file of its own.
+std::string idOfNewCommit(const GitRepository &repository)
+{
+    const std::string beginning = "ref: ";
+    const auto folder = repository / ".git";
+    if (!std::filesystem::is_directory(folder))
+        return repository.line({"rev-parse", "HEAD"});
+    std::string text = withoutLineFeed(readFile(folder / "HEAD"));
+    if (text.compare(0, beginning.size(), beginning) == 0)
+        text = withoutLineFeed(readFile(folder / text.substr(beginning.size())));
+    return text;
+}
+
 } // namespace
 
 GitRepository GitRepository::init(const std::filesystem::path &folder)
 {
-    runOrThrow(
-        makeCommand({"init", "--quiet", "--template=", "--initial-branch=main", folder.string()}));
+    // Starting git takes many times as long as writing these few files.
+    static const NewRepository made = askGitForNewRepository();
+    if (std::filesystem::exists(folder / ".git"))
+        throw std::runtime_error("a repository is there already: " + folder.string());
+    std::filesystem::create_directories(folder);
+    for (const auto &name : made.folders)
+        std::filesystem::create_directory(folder / name);
+    for (const auto &[name, bytes] : made.files)
+        writeFile(folder / name, bytes);
     return GitRepository(folder);
 }
 
@@ -60,18 +133,12 @@ void GitRepository::write(const std::string &name, const std::string &bytes) con
 {
     const auto file = path_ / name;
     std::filesystem::create_directories(file.parent_path());
-    std::ofstream stream(file, std::ios::binary | std::ios::trunc);
-    stream << bytes << std::flush;
-    if (!stream)
-        throw std::runtime_error("can't write " + file.string());
+    writeFile(file, bytes);
 }
 
 std::string GitRepository::read(const std::string &name) const
 {
-    std::ifstream stream(path_ / name, std::ios::binary);
-    if (!stream)
-        throw std::runtime_error("can't read " + (path_ / name).string());
-    return {std::istreambuf_iterator<char>(stream), {}};
+    return readFile(path_ / name);
 }
 
 void GitRepository::makeFolder(const std::string &name) const
@@ -117,7 +184,7 @@ std::string GitRepository::commit(const std::string &message)
                         "--no-verify", "--message", message})
                    .environment("GIT_AUTHOR_DATE", date)
                    .environment("GIT_COMMITTER_DATE", date));
-    return line({"rev-parse", "HEAD"});
+    return idOfNewCommit(*this);
 }
 
 std::string GitRepository::commitAll(const std::string &message)
@@ -133,10 +200,7 @@ std::string GitRepository::git(const std::vector<std::string> &arguments) const
 
 std::string GitRepository::line(const std::vector<std::string> &arguments) const
 {
-    auto text = git(arguments);
-    if (!text.empty() && text.back() == '\n')
-        text.pop_back();
-    return text;
+    return withoutLineFeed(git(arguments));
 }
 
 CommandResult GitRepository::tryGit(const std::vector<std::string> &arguments) const

@@ -1,5 +1,8 @@
 // SPDX-License-Identifier: MIT
 #include <filesystem>
+#include <fstream>
+#include <iterator>
+#include <map>
 #include <stdexcept>
 #include <string>
 
@@ -15,6 +18,21 @@ namespace fs = std::filesystem;
 using testing::HasSubstr;
 using vclink::test::GitRepository;
 
+/// Mode and bytes of each file, and each folder's mode.
+std::map<std::string, std::string> filesBelow(const fs::path &folder)
+{
+    std::map<std::string, std::string> files;
+    for (const auto &entry : fs::recursive_directory_iterator(folder))
+    {
+        std::string &text = files[entry.path().lexically_relative(folder)];
+        text = std::to_string(static_cast<unsigned>(entry.status().permissions()));
+        std::ifstream stream(entry.path(), std::ios::binary);
+        if (entry.is_regular_file())
+            text.append(std::istreambuf_iterator<char>(stream), {});
+    }
+    return files;
+}
+
 class GitRepositoryTest : public vclink::test::GitTest
 {
 };
@@ -25,6 +43,20 @@ TEST_F(GitRepositoryTest, BeginsEmptyOnTheBranchMain)
     EXPECT_EQ(repository.path(), folder() / "repository");
     EXPECT_EQ(repository.line({"symbolic-ref", "HEAD"}), "refs/heads/main");
     EXPECT_EQ(repository.git({"status", "--porcelain"}), "");
+}
+
+TEST_F(GitRepositoryTest, BeginsAsGitInitMakesIt)
+{
+    const auto repository = makeRepository();
+    const auto made = folder() / "made";
+    repository.git({"init", "--quiet", "--template=", "--initial-branch=main", made.string()});
+    EXPECT_EQ(filesBelow(repository.path()), filesBelow(made));
+}
+
+TEST_F(GitRepositoryTest, DoesNotBeginOverAnother)
+{
+    const auto repository = makeRepository();
+    EXPECT_THROW(makeRepository(), std::runtime_error);
 }
 
 TEST_F(GitRepositoryTest, WritesFilesOfAnyNameAndContent)
@@ -83,6 +115,24 @@ TEST_F(GitRepositoryTest, CommitsTheSameIdsEveryTime)
     EXPECT_EQ(id.size(), 40u);
     EXPECT_EQ(two.commitAll("first"), id);
     EXPECT_NE(one.commit("second"), id);
+}
+
+TEST_F(GitRepositoryTest, TellsTheIdOfACommitOnABranchOnNoneAndInALinkedWorkingCopy)
+{
+    const auto expectIdOfHead = [](GitRepository repository)
+    {
+        const auto id = repository.commit("message");
+        EXPECT_EQ(id, repository.line({"rev-parse", "HEAD"}));
+    };
+    auto repository = makeRepository();
+    expectIdOfHead(repository);
+    repository.git({"pack-refs", "--all"});
+    repository.git({"checkout", "--quiet", "-b", "a/branch"});
+    expectIdOfHead(repository);
+    repository.git({"checkout", "--quiet", "--detach"});
+    expectIdOfHead(repository);
+    repository.git({"worktree", "add", "--quiet", folder() / "linked"});
+    expectIdOfHead(GitRepository(folder() / "linked"));
 }
 
 TEST_F(GitRepositoryTest, CommitsWithoutLeavingAnIdentity)

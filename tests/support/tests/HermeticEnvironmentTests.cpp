@@ -4,6 +4,7 @@
 #include <memory>
 #include <string>
 
+#include <dlfcn.h>
 #include <git2.h>
 #include <gtest/gtest.h>
 
@@ -86,6 +87,19 @@ TEST(HermeticEnvironment, LeavesGitWithoutAnyConfiguration)
     const auto list = vclink::test::Command({"git", "config", "--list"}).in(folder.path()).run();
     EXPECT_TRUE(list.succeeded()) << list.errors;
     EXPECT_EQ(list.output, "");
+}
+
+TEST(HermeticEnvironment, LeavesLibGit2WithoutTheCertificatesOfTheMachine)
+{
+    using Reading = int(void *, const char *);
+    auto *const read =
+        reinterpret_cast<Reading *>(::dlsym(RTLD_DEFAULT, "mbedtls_x509_crt_parse_file"));
+    // A libgit2 with another TLS has no such function.
+    if (read == nullptr)
+        return;
+    // Neither file exists. Only the second is looked for.
+    EXPECT_EQ(read(nullptr, "/etc/nonexistent"), 0);
+    EXPECT_NE(read(nullptr, "/nonexistent"), 0);
 }
 
 TEST(HermeticEnvironment, IsWhatALaterStartOfLibGit2Finds)
