@@ -1,16 +1,72 @@
 # SPDX-License-Identifier: MIT
-# vclink_add_tests(TARGET LABEL label SOURCES file... [LIBRARIES library...]): an executable of
-# GoogleTest cases, each a test of ctest. It links the layers' objects, so that what the library
-# hides can be tested too.
+# Programs of GoogleTest cases, and how ctest runs them.
+
+# vclink_discover_tests(TARGET LABEL label [EACH_CASE] [COST cost] [TIMEOUT seconds]
+#     [PROPERTIES name value...]): makes each suite of the program a test of ctest, called
+# PROGRAM.SUITE. The cases of a suite run one after the other in one process: to start a program
+# under the sanitizers takes longer than most cases do. With EACH_CASE each case is a test, called
+# PROGRAM.SUITE.CASE, with a process of its own: for long cases, so that no processor idles at the
+# end, and for threads, which may race only where something is used for the first time. COST is the
+# time of a case in tenths of a second, 1 by default: ctest starts the longest tests first.
+#
+# A skipped case is a failure, and so is a program that ends before its last case.
+add_library(vclink_test_complete_run OBJECT
+    ${CMAKE_CURRENT_LIST_DIR}/../tests/support/completeRun.cpp)
+vclink_configure_target(vclink_test_complete_run)
+target_link_libraries(vclink_test_complete_run PRIVATE GTest::gtest)
+
+function(vclink_discover_tests target)
+    cmake_parse_arguments(PARSE_ARGV 1 arg "EACH_CASE" "LABEL;COST;TIMEOUT" "PROPERTIES")
+    if(NOT arg_LABEL OR arg_UNPARSED_ARGUMENTS)
+        message(FATAL_ERROR "${target}: one label, not '${arg_LABEL};${arg_UNPARSED_ARGUMENTS}'")
+    endif()
+    if(NOT arg_COST)
+        set(arg_COST 1)
+    endif()
+    if(NOT arg_TIMEOUT)
+        set(arg_TIMEOUT 300)
+    endif()
+    target_link_libraries(${target} PRIVATE vclink_test_complete_run)
+    # A mutant may be unable to list its tests; scripts/mutate runs the programs itself.
+    if(VCLINK_RECORD_REACH)
+        return()
+    endif()
+    set(file "${CMAKE_CURRENT_BINARY_DIR}/${target}.tests.cmake")
+    add_custom_command(TARGET ${target} POST_BUILD
+        COMMAND "${CMAKE_COMMAND}"
+            -D "NAME=${target}"
+            -D "PROGRAM=$<TARGET_FILE:${target}>"
+            -D "FOLDER=${CMAKE_CURRENT_BINARY_DIR}"
+            -D "EACH_CASE=${arg_EACH_CASE}"
+            -D "COST=${arg_COST}"
+            -D "PROPERTIES=LABELS;${arg_LABEL};TIMEOUT;${arg_TIMEOUT};${arg_PROPERTIES}"
+            -D "FILE=${file}"
+            -P "${PROJECT_SOURCE_DIR}/cmake/DiscoverTests.cmake"
+        BYPRODUCTS "${file}"
+        VERBATIM)
+    set(include "${CMAKE_CURRENT_BINARY_DIR}/${target}.include.cmake")
+    file(CONFIGURE OUTPUT "${include}" @ONLY CONTENT [[
+if(EXISTS "@file@")
+    include("@file@")
+else()
+    add_test(@target@_NOT_BUILT @target@_NOT_BUILT)
+endif()
+]])
+    set_property(DIRECTORY APPEND PROPERTY TEST_INCLUDE_FILES "${include}")
+endfunction()
+
+# vclink_add_tests(TARGET LABEL label SOURCES file... [LIBRARIES library...] [EACH_CASE]
+#     [COST cost]): such a program. It links the layers' objects, so that what the library hides
+# can be tested too.
 #
 # vclink_thread_tests builds the executables whose tests are labelled "threads" and nothing else, for
 # the builds under ThreadSanitizer.
 add_custom_target(vclink_thread_tests)
 
 function(vclink_add_tests target)
-    cmake_parse_arguments(PARSE_ARGV 1 arg "" "LABEL" "SOURCES;LIBRARIES")
-    if(NOT arg_LABEL OR arg_UNPARSED_ARGUMENTS)
-        message(FATAL_ERROR "${target}: one label, not '${arg_LABEL};${arg_UNPARSED_ARGUMENTS}'")
+    cmake_parse_arguments(PARSE_ARGV 1 arg "EACH_CASE" "LABEL;COST" "SOURCES;LIBRARIES")
+    if(arg_UNPARSED_ARGUMENTS)
+        message(FATAL_ERROR "${target}: what is '${arg_UNPARSED_ARGUMENTS}'?")
     endif()
     add_executable(${target}
         ${arg_SOURCES}
@@ -26,7 +82,9 @@ function(vclink_add_tests target)
     if(arg_LABEL STREQUAL "threads")
         add_dependencies(vclink_thread_tests ${target})
     endif()
-    gtest_discover_tests(${target}
-        DISCOVERY_TIMEOUT 60
-        PROPERTIES LABELS ${arg_LABEL} TIMEOUT 300)
+    set(options)
+    if(arg_EACH_CASE)
+        set(options EACH_CASE)
+    endif()
+    vclink_discover_tests(${target} LABEL ${arg_LABEL} COST ${arg_COST} ${options})
 endfunction()
