@@ -31,7 +31,7 @@ const std::string eastern = "\xE6\x9D\xB1\xE4\xBA\xAC gr\xC3\xBC\xC3\x9F";
 class CloneSpecifier : public vclink::test::CloneTest
 {
   protected:
-    CloneSpecifier() : CloneTest(Naming::plainPath)
+    CloneSpecifier() : CloneTest(Naming::PlainPath)
     {
     }
 

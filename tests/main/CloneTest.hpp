@@ -16,7 +16,7 @@ namespace vclink::test
 class CloneTest : public RemoteTest
 {
   protected:
-    explicit CloneTest(Naming naming = Naming::fileUrl) : RemoteTest(naming)
+    explicit CloneTest(Naming naming = Naming::FileUrl) : RemoteTest(naming)
     {
         author_.write("folder/nested", "x");
         author_.write("folder/script", "#!/bin/sh\n");

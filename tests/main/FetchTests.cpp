@@ -231,12 +231,12 @@ TEST_P(Fetch, LeavesNoDescriptorOpen)
     fetch();
     interactor_->cancel();
     publish("file", "changed again\n");
-    if (GetParam() == Naming::fileUrl)
+    if (GetParam() == Naming::FileUrl)
         vclink::test::expectCancelled([this] { fetch(); });
     repository_.git({"remote", "set-url", "origin", (folder() / "nowhere").string()});
     libGit2FailureOf([this] { fetch(); });
 }
 
-INSTANTIATE_TEST_SUITE_P(Locally, Fetch, testing::Values(Naming::plainPath, Naming::fileUrl));
+INSTANTIATE_TEST_SUITE_P(Locally, Fetch, testing::Values(Naming::PlainPath, Naming::FileUrl));
 
 } // namespace

@@ -251,6 +251,6 @@ TEST_P(RemoteHeads, AreManyInOrder)
     EXPECT_EQ(found, headsOfGit());
 }
 
-INSTANTIATE_TEST_SUITE_P(Locally, RemoteHeads, testing::Values(Naming::plainPath, Naming::fileUrl));
+INSTANTIATE_TEST_SUITE_P(Locally, RemoteHeads, testing::Values(Naming::PlainPath, Naming::FileUrl));
 
 } // namespace

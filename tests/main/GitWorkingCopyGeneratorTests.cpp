@@ -236,6 +236,6 @@ TEST_P(Clone, LeavesNoDescriptorOpen)
     vclink::test::expectCancelled([this] { generate(nameOf(server_), folder() / "third"); });
 }
 
-INSTANTIATE_TEST_SUITE_P(Locally, Clone, testing::Values(Naming::plainPath, Naming::fileUrl));
+INSTANTIATE_TEST_SUITE_P(Locally, Clone, testing::Values(Naming::PlainPath, Naming::FileUrl));
 
 } // namespace

@@ -218,6 +218,6 @@ TEST_P(Push, LeavesNoDescriptorOpen)
     libGit2FailureOf([this] { push({"refs/heads/no:refs/heads/no"}); });
 }
 
-INSTANTIATE_TEST_SUITE_P(Locally, Push, testing::Values(Naming::plainPath, Naming::fileUrl));
+INSTANTIATE_TEST_SUITE_P(Locally, Push, testing::Values(Naming::PlainPath, Naming::FileUrl));
 
 } // namespace

@@ -52,7 +52,7 @@ RemoteTest::RemoteTest(Naming naming) : naming_(naming)
 
 std::string RemoteTest::nameOf(const GitRepository &repository) const
 {
-    return (naming_ == Naming::fileUrl ? "file://" : "") + repository.path().string();
+    return (naming_ == Naming::FileUrl ? "file://" : "") + repository.path().string();
 }
 
 void RemoteTest::fetch(const std::vector<std::string> &refspecs) const

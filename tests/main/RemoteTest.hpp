@@ -15,8 +15,8 @@ namespace vclink::test
 /// How a repository on this machine is named: libgit2 copies the one and talks to the other.
 enum class Naming
 {
-    plainPath,
-    fileUrl
+    PlainPath,
+    FileUrl
 };
 
 /// Expects that `action` ends with the exception of a cancellation, which leaves nothing behind.
@@ -28,7 +28,7 @@ void expectCancelled(const std::function<void()> &action);
 class RemoteTest : public BranchTest
 {
   protected:
-    explicit RemoteTest(Naming naming = Naming::fileUrl);
+    explicit RemoteTest(Naming naming = Naming::FileUrl);
 
     using BranchTest::idOf;
     static std::string idOf(const std::string &revision, const GitRepository &repository)
