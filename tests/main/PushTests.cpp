@@ -17,7 +17,6 @@ namespace
 
 namespace git = vclink::git;
 using testing::Contains;
-using testing::IsEmpty;
 using testing::StartsWith;
 using vclink::test::libGit2FailureOf;
 using vclink::test::LogCapture;
