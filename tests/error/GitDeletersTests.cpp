@@ -4,7 +4,6 @@
 #include <string>
 #include <type_traits>
 #include <utility>
-#include <vector>
 
 #include <git2.h>
 #include <gmock/gmock.h>
@@ -13,49 +12,14 @@
 #include "error/errorUtil/GitResult.hpp"
 #include "support/GitTest.hpp"
 #include "support/LibGit2Session.hpp"
-#include "support/interposition.hpp"
-
-namespace
-{
-
-using Release = std::pair<std::string, const void *>;
-
-std::vector<Release> releases;
-
-template <class Handle> void noteAndForward(const char *name, Handle *handle)
-{
-    releases.emplace_back(name, handle);
-    vclink::test::findNext<void(Handle *)>(name)(handle);
-}
-
-} // namespace
-
-// This program's own definitions go before libgit2's, which they note and call.
-#define NOTE_RELEASES(function, Pointer)                                                           \
-    extern "C" void function(Pointer handle)                                                       \
-    {                                                                                              \
-        noteAndForward(#function, handle);                                                         \
-    }
-NOTE_RELEASES(git_annotated_commit_free, git_annotated_commit *)
-NOTE_RELEASES(git_branch_iterator_free, git_branch_iterator *)
-NOTE_RELEASES(git_commit_free, git_commit *)
-NOTE_RELEASES(git_config_free, git_config *)
-NOTE_RELEASES(git_index_free, git_index *)
-NOTE_RELEASES(git_index_conflict_iterator_free, git_index_conflict_iterator *)
-NOTE_RELEASES(git_object_free, git_object *)
-NOTE_RELEASES(git_odb_free, git_odb *)
-NOTE_RELEASES(git_odb_object_free, git_odb_object *)
-NOTE_RELEASES(git_reference_free, git_reference *)
-NOTE_RELEASES(git_remote_free, git_remote *)
-NOTE_RELEASES(git_repository_free, git_repository *)
-NOTE_RELEASES(git_signature_free, git_signature *)
-NOTE_RELEASES(git_tree_free, git_tree *)
+#include "support/libgit2/LibGit2Recorder.hpp"
 
 namespace vclink::git
 {
 namespace
 {
 
+using testing::ElementsAre;
 using testing::IsEmpty;
 
 template <class... Handles>
@@ -90,10 +54,10 @@ class GitDeletersTest : public test::GitTest
         OwnedHandle<Handle> handle = std::move(made).value();
         const void *const raw = handle.get();
         ASSERT_NE(raw, nullptr) << function;
-        releases.clear();
+        const test::LibGit2Recorder recorder;
         handle.reset();
-        ASSERT_FALSE(releases.empty()) << function;
-        EXPECT_EQ(releases.front(), Release(function, raw));
+        ASSERT_THAT(recorder.names(), ElementsAre(function));
+        EXPECT_EQ(recorder.calls().front().handle, raw);
     }
 
     git_repository *repository() const
@@ -166,11 +130,11 @@ template <class... Handles> void releaseNulls()
 
 TEST(GitDeleters, PassNoNullOn)
 {
-    releases.clear();
+    const test::LibGit2Recorder recorder;
     releaseNulls<git_annotated_commit, git_branch_iterator, git_commit, git_config, git_index,
                  git_index_conflict_iterator, git_object, git_odb, git_odb_object, git_reference,
                  git_remote, git_repository, git_signature, git_tree>();
-    EXPECT_THAT(releases, IsEmpty());
+    EXPECT_THAT(recorder.calls(), IsEmpty());
 }
 
 } // namespace

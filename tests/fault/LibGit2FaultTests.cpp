@@ -90,7 +90,8 @@ TEST_P(FailingLibGit2Call, ComesOutAndLeavesNothing)
     {
         for (const auto when : {When::Before, When::After})
         {
-            if (when == When::Before && vclink::test::isUnexamined(site.operation, site.fault.function))
+            if (when == When::Before &&
+                vclink::test::isUnexamined(site.operation, site.fault.function))
                 continue;
             for (const int code : codes)
             {

@@ -195,15 +195,15 @@ std::string expectedOutcome(const FaultSite &site, const std::string &normal)
     if (isUnexamined(site.operation, site.fault.function))
         return normal;
     const auto tolerances = tolerancesOf(site.operation, normal);
-    const auto found = std::find_if(
-        tolerances.begin(), tolerances.end(),
-        [&site](const Tolerance &tolerance)
-        {
-            return begins(site.operation, tolerance.operations) &&
-                   site.fault.function == tolerance.function &&
-                   (tolerance.call == any || tolerance.call == site.fault.call) &&
-                   (tolerance.code == any || tolerance.code == site.fault.code);
-        });
+    const auto found =
+        std::find_if(tolerances.begin(), tolerances.end(),
+                     [&site](const Tolerance &tolerance)
+                     {
+                         return begins(site.operation, tolerance.operations) &&
+                                site.fault.function == tolerance.function &&
+                                (tolerance.call == any || tolerance.call == site.fault.call) &&
+                                (tolerance.code == any || tolerance.code == site.fault.code);
+                     });
     return found != tolerances.end()
                ? found->outcome
                : failureIn(site.operation, site.fault.code, GIT_ERROR_OS, injectedText);

@@ -1,7 +1,6 @@
 // SPDX-License-Identifier: MIT
 #include <cstdint>
 #include <cstring>
-#include <functional>
 #include <memory>
 #include <stdexcept>
 #include <string>
@@ -19,29 +18,9 @@
 #include "options/gitRecords.hpp"
 #include "support/LogCapture.hpp"
 #include "support/TestInteractor.hpp"
-#include "support/interposition.hpp"
+#include "support/libgit2/LibGit2Recorder.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
 #include "vclink/util/exception/CancelledOperationException.hpp"
-
-namespace
-{
-
-using Init = int(git_checkout_options *, unsigned);
-
-/// What answers in libgit2's place where it is set.
-std::function<Init> onInit;
-
-} // namespace
-
-// This program's own definition goes before libgit2's.
-int git_checkout_options_init(git_checkout_options *options, unsigned version)
-{
-    if (onInit)
-    {
-        return onInit(options, version);
-    }
-    return vclink::test::findNext<Init>("git_checkout_options_init")(options, version);
-}
 
 namespace vclink::git
 {
@@ -73,7 +52,6 @@ class ToGitCheckoutOptions : public testing::Test
     }
     ~ToGitCheckoutOptions() override
     {
-        onInit = nullptr;
         pendingCallbackException() = nullptr;
     }
 
@@ -138,13 +116,15 @@ TEST_F(ToGitCheckoutOptions, GivesAZeroedRecordToLibGit2)
 {
     std::vector<unsigned char> before;
     unsigned versionGiven = 0;
-    onInit = [&](git_checkout_options *record, unsigned version)
-    {
-        before = bytesOf(*record);
-        versionGiven = version;
-        record->file_mode = 0640;
-        return 0;
-    };
+    test::LibGit2Recorder recorder;
+    recorder.answer<git_checkout_options_init>(
+        [&](auto, git_checkout_options *record, unsigned version)
+        {
+            before = bytesOf(*record);
+            versionGiven = version;
+            record->file_mode = 0640;
+            return 0;
+        });
     const git_checkout_options record = convert(1);
     EXPECT_EQ(before.size(), sizeof(record));
     EXPECT_THAT(before, Each(0));
@@ -155,11 +135,13 @@ TEST_F(ToGitCheckoutOptions, GivesAZeroedRecordToLibGit2)
 TEST_F(ToGitCheckoutOptions, RaisesTheFailureOfLibGit2)
 {
     const HermeticLibGit2 libgit2;
-    onInit = [](git_checkout_options *, unsigned)
-    {
-        git_error_set_str(GIT_ERROR_INVALID, "invalid version");
-        return -1;
-    };
+    test::LibGit2Recorder recorder;
+    recorder.answer<git_checkout_options_init>(
+        [](auto...)
+        {
+            git_error_set_str(GIT_ERROR_INVALID, "invalid version");
+            return -1;
+        });
     try
     {
         convert(1);

@@ -1,5 +1,4 @@
 // SPDX-License-Identifier: MIT
-#include <algorithm>
 #include <cstring>
 #include <functional>
 #include <memory>
@@ -14,69 +13,14 @@
 #include "error/CoreFilter.hpp"
 #include "error/HermeticLibGit2.hpp"
 #include "error/errorUtil/callbackException.hpp"
-#include "error/errorUtil/setGitError.hpp"
 #include "error/logging/severity.hpp"
 #include "options/gitRecords.hpp"
 #include "support/LogCapture.hpp"
 #include "support/TestInteractor.hpp"
-#include "support/interposition.hpp"
+#include "support/libgit2/LibGit2Recorder.hpp"
 #include "vclink/git/GitOptionsFactory.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
 #include "vclink/util/exception/CancelledOperationException.hpp"
-
-namespace
-{
-
-/// The init functions that were called, in order.
-std::vector<std::string> inits;
-/// The records that were not zeroed, or of another version than 1, by the init function's name.
-std::vector<std::string> unfit;
-/// The init function that fails.
-std::string failing;
-
-template <class Record> int init(const char *name, Record *record, unsigned version)
-{
-    inits.emplace_back(name);
-    const auto *const bytes = reinterpret_cast<const unsigned char *>(record);
-    const bool isZeroed =
-        std::all_of(bytes, bytes + sizeof(*record), [](unsigned char byte) { return byte == 0; });
-    if (!isZeroed || version != 1)
-        unfit.emplace_back(name);
-    if (failing == name)
-    {
-        git_error_set_str(GIT_ERROR_INVALID, "invalid version");
-        return -1;
-    }
-    return vclink::test::findNext<int(Record *, unsigned)>(name)(record, version);
-}
-
-} // namespace
-
-// This program's own definitions go before libgit2's.
-int git_remote_init_callbacks(git_remote_callbacks *record, unsigned version)
-{
-    return init("git_remote_init_callbacks", record, version);
-}
-int git_proxy_options_init(git_proxy_options *record, unsigned version)
-{
-    return init("git_proxy_options_init", record, version);
-}
-int git_checkout_options_init(git_checkout_options *record, unsigned version)
-{
-    return init("git_checkout_options_init", record, version);
-}
-int git_fetch_options_init(git_fetch_options *record, unsigned version)
-{
-    return init("git_fetch_options_init", record, version);
-}
-int git_push_options_init(git_push_options *record, unsigned version)
-{
-    return init("git_push_options_init", record, version);
-}
-int git_clone_options_init(git_clone_options *record, unsigned version)
-{
-    return init("git_clone_options_init", record, version);
-}
 
 namespace vclink::git
 {
@@ -85,7 +29,6 @@ namespace
 
 using test::LogCapture;
 using testing::ElementsAre;
-using testing::IsEmpty;
 using testing::StartsWith;
 using vclink::util::exception::CancelledOperationException;
 
@@ -102,7 +45,6 @@ template <class Record> Record initialised(int (*function)(Record *, unsigned))
     Record record;
     std::memset(&record, 0, sizeof(record));
     EXPECT_EQ(function(&record, 1), 0);
-    inits.clear();
     return record;
 }
 
@@ -111,15 +53,16 @@ class RemoteRecords : public testing::Test
   protected:
     RemoteRecords()
     {
-        inits.clear();
-        unfit.clear();
-        failing.clear();
+        checkRecords<git_remote_init_callbacks>();
+        checkRecords<git_proxy_options_init>();
+        checkRecords<git_checkout_options_init>();
+        checkRecords<git_fetch_options_init>();
+        checkRecords<git_push_options_init>();
+        checkRecords<git_clone_options_init>();
         pendingCallbackException() = nullptr;
     }
     ~RemoteRecords() override
     {
-        EXPECT_THAT(unfit, IsEmpty()) << "a record was not zeroed, or of another version";
-        failing.clear();
         pendingCallbackException() = nullptr;
     }
 
@@ -148,15 +91,19 @@ class RemoteRecords : public testing::Test
         EXPECT_EQ(record.push_update_reference("name", "no", set), 0);
         EXPECT_EQ(record.push_negotiation(nullptr, 7, set), 0);
     }
-    /// Every init function that `convert` calls, made to fail, fails it.
-    void expectEachInitToRaise(const std::function<void()> &convert) const
+    /// Each of the init functions that `convert` calls, made to fail, ends it with the failure.
+    void expectEachInitToRaise(std::size_t count, const std::function<void()> &convert)
     {
         const test::HermeticLibGit2 libgit2;
+        calls_.clear();
         convert();
-        const std::vector<std::string> called = inits;
+        const std::vector<std::string> called = calls_.steps();
+        EXPECT_EQ(called.size(), count);
+        std::vector<std::string> expected;
         for (const auto &name : called)
         {
-            failing = name;
+            calls_.clear();
+            calls_.fail({{name, -1}});
             try
             {
                 convert();
@@ -165,15 +112,31 @@ class RemoteRecords : public testing::Test
             catch (const LibGit2Exception &exception)
             {
                 EXPECT_EQ(exception.getError().getCode(), -1);
-                EXPECT_EQ(exception.getError().getErrorClass(), GIT_ERROR_INVALID);
-                EXPECT_EQ(exception.getError().getMessage(), u"invalid version");
+                EXPECT_EQ(exception.getError().getErrorClass(), GIT_ERROR_OS);
+                EXPECT_EQ(exception.getError().getMessage(), u"injected");
             }
+            expected.push_back(name);
+            EXPECT_EQ(calls_.steps(), expected);
         }
     }
+
+    test::LibGit2Recorder calls_;
 
     const std::shared_ptr<test::TestInteractor> interactor_ =
         std::make_shared<test::TestInteractor>();
     const std::unique_ptr<GitCallbacks> callbacks_ = makeDefaultGitCallbacks(interactor_);
+
+  private:
+    /// Expects that libgit2 is given zeroed records, of version 1.
+    template <auto Init> void checkRecords()
+    {
+        calls_.on<Init>(
+            [](const auto *record, unsigned version)
+            {
+                EXPECT_THAT(bytesOf(*record), testing::Each(0));
+                EXPECT_EQ(version, 1U);
+            });
+    }
 };
 
 using ToGitRemoteCallbacks = RemoteRecords;
@@ -272,7 +235,7 @@ TEST_F(ToGitRemoteCallbacks, ParksWhatTheLogRaises)
 
 TEST_F(ToGitRemoteCallbacks, RaisesTheFailureOfLibGit2)
 {
-    expectEachInitToRaise([this] { remoteRecord(); });
+    expectEachInitToRaise(1, [this] { remoteRecord(); });
 }
 
 TEST_F(ToGitFetchOptions, SetsTheProxyAndThenTheCallbacks)
@@ -280,10 +243,10 @@ TEST_F(ToGitFetchOptions, SetsTheProxyAndThenTheCallbacks)
     git_fetch_options expected = initialised(git_fetch_options_init);
     expected.proxy_opts = proxyRecord();
     expected.callbacks = remoteRecord();
-    inits.clear();
+    calls_.clear();
     EXPECT_EQ(bytesOf(toGitFetchOptions(FetchOptions(), *callbacks_)), bytesOf(expected));
-    EXPECT_THAT(inits, ElementsAre("git_fetch_options_init", "git_proxy_options_init",
-                                   "git_remote_init_callbacks"));
+    EXPECT_THAT(calls_.steps(), ElementsAre("git_fetch_options_init", "git_proxy_options_init",
+                                            "git_remote_init_callbacks"));
 }
 
 TEST_F(ToGitFetchOptions, LeavesTagsAndPruningToTheConfiguration)
@@ -298,8 +261,7 @@ TEST_F(ToGitFetchOptions, LeavesTagsAndPruningToTheConfiguration)
 
 TEST_F(ToGitFetchOptions, RaisesTheFailureOfLibGit2)
 {
-    expectEachInitToRaise([this] { toGitFetchOptions(FetchOptions(), *callbacks_); });
-    EXPECT_EQ(inits.size(), 3u + 1 + 2 + 3);
+    expectEachInitToRaise(3, [this] { toGitFetchOptions(FetchOptions(), *callbacks_); });
 }
 
 TEST_F(ToGitPushOptions, SetsTheThreadsThenTheCallbacksAndTheProxy)
@@ -307,24 +269,24 @@ TEST_F(ToGitPushOptions, SetsTheThreadsThenTheCallbacksAndTheProxy)
     git_push_options expected = initialised(git_push_options_init);
     expected.callbacks = remoteRecord();
     expected.proxy_opts = proxyRecord();
-    inits.clear();
+    calls_.clear();
     PushOptions options;
     for (const unsigned threads : {1u, 0u, 3u, 0xFFFFFFFFu})
     {
         options.packbuilderParallelism = threads;
         expected.pb_parallelism = threads;
-        inits.clear();
+        calls_.clear();
         EXPECT_EQ(bytesOf(toGitPushOptions(options, *callbacks_)), bytesOf(expected));
-        EXPECT_THAT(inits, ElementsAre("git_push_options_init", "git_remote_init_callbacks",
-                                       "git_proxy_options_init"));
+        EXPECT_THAT(calls_.steps(),
+                    ElementsAre("git_push_options_init", "git_remote_init_callbacks",
+                                "git_proxy_options_init"));
     }
     EXPECT_EQ(toGitPushOptions(PushOptions(), *callbacks_).pb_parallelism, 1u);
 }
 
 TEST_F(ToGitPushOptions, RaisesTheFailureOfLibGit2)
 {
-    expectEachInitToRaise([this] { toGitPushOptions(PushOptions(), *callbacks_); });
-    EXPECT_EQ(inits.size(), 3u + 1 + 2 + 3);
+    expectEachInitToRaise(3, [this] { toGitPushOptions(PushOptions(), *callbacks_); });
 }
 
 TEST_F(ToGitCloneOptions, SetsTheRecordsOfTheCheckoutAndOfTheFetch)
@@ -335,11 +297,11 @@ TEST_F(ToGitCloneOptions, SetsTheRecordsOfTheCheckoutAndOfTheFetch)
     expected.checkout_opts =
         toGitCheckoutOptions(options.checkoutOptions, callbacks_->checkoutCallbacks());
     expected.fetch_opts = toGitFetchOptions(options.fetchOptions, *callbacks_);
-    inits.clear();
+    calls_.clear();
     EXPECT_EQ(bytesOf(toGitCloneOptions(options, *callbacks_)), bytesOf(expected));
-    EXPECT_THAT(inits, ElementsAre("git_clone_options_init", "git_checkout_options_init",
-                                   "git_fetch_options_init", "git_proxy_options_init",
-                                   "git_remote_init_callbacks"));
+    EXPECT_THAT(calls_.steps(), ElementsAre("git_clone_options_init", "git_checkout_options_init",
+                                            "git_fetch_options_init", "git_proxy_options_init",
+                                            "git_remote_init_callbacks"));
 }
 
 TEST_F(ToGitCloneOptions, OfTheFactoryAreASafeCloneWithAWorkingTree)
@@ -382,8 +344,7 @@ TEST_F(ToGitCloneOptions, KeepsNoBranchOfItsOwn)
 
 TEST_F(ToGitCloneOptions, RaisesTheFailureOfLibGit2)
 {
-    expectEachInitToRaise([this] { toGitCloneOptions(CloneOptions(), *callbacks_); });
-    EXPECT_EQ(inits.size(), 5u + 1 + 2 + 3 + 4 + 5);
+    expectEachInitToRaise(5, [this] { toGitCloneOptions(CloneOptions(), *callbacks_); });
 }
 
 } // namespace

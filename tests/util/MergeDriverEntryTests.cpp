@@ -12,10 +12,10 @@
 #include <vector>
 
 #include <git2.h>
+#include <git2/sys/merge.h>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "MergeDriverCalls.hpp"
 #include "error/errorUtil/GitResult.hpp"
 #include "error/errorUtil/callbackException.hpp"
 #include "support/GitTest.hpp"
@@ -23,6 +23,7 @@
 #include "support/LogCapture.hpp"
 #include "support/NothingLeft.hpp"
 #include "support/Scripts.hpp"
+#include "support/libgit2/LibGit2Recorder.hpp"
 #include "util/GitMergeDriverLookup.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
 #include "vclink/git/LibGit2Guard.hpp"
@@ -31,12 +32,24 @@ namespace
 {
 
 namespace git = vclink::git;
+using testing::Contains;
 using testing::ElementsAre;
 using testing::IsEmpty;
+using testing::Not;
+using vclink::test::LibGit2Recorder;
 using vclink::test::LogCapture;
 using vclink::test::LogRecord;
-using vclink::test::MergeDriverCalls;
 using vclink::test::Scripts;
+
+/// What the source of a merge tells.
+struct Source
+{
+    const git_index_entry *ancestor = nullptr;
+    const git_index_entry *ours = nullptr;
+    const git_index_entry *theirs = nullptr;
+    git_repository *repository = nullptr;
+    git_merge_file_options options = {};
+};
 
 /// What the driver gives back.
 struct Answer
@@ -57,11 +70,9 @@ class MergeDriverEntry : public vclink::test::GitTest
     {
         opened_ =
             git::acquire<git_repository>(git_repository_open, repository_.path().c_str()).value();
-        calls_.repository = opened_.get();
-        calls_.ancestor = makeEntry(ancestor_, "base\n");
-        calls_.ours = makeEntry(ours_, "ours\n");
-        calls_.theirs = makeEntry(theirs_, "theirs\n");
-        calls_.names.clear();
+        source_ = {makeEntry(ancestor_, "base\n"), makeEntry(ours_, "ours\n"),
+                   makeEntry(theirs_, "theirs\n"), opened_.get()};
+        answerForTheSource();
     }
 
     /// The driver's answer for the driver "tool".
@@ -73,7 +84,10 @@ class MergeDriverEntry : public vclink::test::GitTest
         std::uint32_t mode = 7;
         git_buf content = GIT_BUF_INIT;
         Answer answer;
+        calls_.clear();
         answer.code = git::wildcardApplyEntry(nullptr, &path, &mode, &content, "tool", nullptr);
+        names_ = calls_.names();
+        steps_ = calls_.steps();
         if (path != untouched)
             answer.path = path;
         if (mode != 7)
@@ -131,10 +145,24 @@ class MergeDriverEntry : public vclink::test::GitTest
     Scripts scripts_{folder() / "scripts"};
     vclink::test::GitRepository repository_ = makeRepository();
     vclink::test::LibGit2Session session_{environment()};
-    MergeDriverCalls calls_;
+    Source source_;
     git::OwnedHandle<git_repository> opened_;
+    LibGit2Recorder calls_;
+    /// The driver's calls in the last apply(), and those of them that are steps.
+    std::vector<std::string> names_;
+    std::vector<std::string> steps_;
 
   private:
+    void answerForTheSource()
+    {
+        calls_.answer<git_merge_driver_source_ancestor>([this](auto...)
+                                                        { return source_.ancestor; });
+        calls_.answer<git_merge_driver_source_ours>([this](auto...) { return source_.ours; });
+        calls_.answer<git_merge_driver_source_theirs>([this](auto...) { return source_.theirs; });
+        calls_.answer<git_merge_driver_source_file_options>([this](auto...)
+                                                            { return &source_.options; });
+        calls_.answer<git_merge_driver_source_repo>([this](auto...) { return source_.repository; });
+    }
     const git_index_entry *makeEntry(git_index_entry &entry, const std::string &content)
     {
         repository_.write("side", content);
@@ -152,10 +180,9 @@ TEST_F(MergeDriverEntry, ReportsEachMissingSideAndReadsNothing)
     for (unsigned missing = 1; missing < 8; ++missing)
     {
         SCOPED_TRACE(missing);
-        calls_.names.clear();
-        calls_.ancestor = (missing & 1) != 0 ? nullptr : &ancestor_;
-        calls_.ours = (missing & 2) != 0 ? nullptr : &ours_;
-        calls_.theirs = (missing & 4) != 0 ? nullptr : &theirs_;
+        source_.ancestor = (missing & 1) != 0 ? nullptr : &ancestor_;
+        source_.ours = (missing & 2) != 0 ? nullptr : &ours_;
+        source_.theirs = (missing & 4) != 0 ? nullptr : &theirs_;
         std::vector<std::string> expected;
         if ((missing & 1) != 0)
             expected.emplace_back("base is nullptr");
@@ -167,7 +194,10 @@ TEST_F(MergeDriverEntry, ReportsEachMissingSideAndReadsNothing)
         const Answer answer = apply();
         EXPECT_EQ(answer.code, GIT_EMERGECONFLICT);
         EXPECT_EQ(log.messages(), expected);
-        EXPECT_THAT(calls_.names, ElementsAre("ancestor", "ours", "theirs", "file_options"));
+        EXPECT_THAT(names_,
+                    ElementsAre("git_merge_driver_source_ancestor", "git_merge_driver_source_ours",
+                                "git_merge_driver_source_theirs",
+                                "git_merge_driver_source_file_options"));
         EXPECT_FALSE(answer.path);
         EXPECT_FALSE(answer.mode);
     }
@@ -179,20 +209,24 @@ TEST_F(MergeDriverEntry, CallsLibGit2InThisOrder)
     std::vector<bool> filesAtRelease;
     calls_.onCall = [&](const std::string &name)
     {
-        if (name == "entry_free")
+        if (name == "git_config_entry_free")
             filesAtRelease.push_back(std::filesystem::is_empty(environment().temporary()));
     };
-    // libgit2 itself reads the configuration before the first object.
-    apply();
-    calls_.names.clear();
-    filesAtRelease.clear();
     const Answer answer = apply();
     EXPECT_EQ(answer.code, 0);
-    EXPECT_THAT(calls_.names,
-                ElementsAre("ancestor", "ours", "theirs", "file_options", "repo", "config_snapshot",
-                            "get_entry", "odb", "odb_read", "object_free", "odb_free", "odb",
-                            "odb_read", "object_free", "odb_free", "odb", "odb_read", "object_free",
-                            "odb_free", "buf_set", "entry_free", "config_free"));
+    ASSERT_GE(names_.size(), 6U);
+    names_.resize(6);
+    EXPECT_THAT(names_,
+                ElementsAre("git_merge_driver_source_ancestor", "git_merge_driver_source_ours",
+                            "git_merge_driver_source_theirs",
+                            "git_merge_driver_source_file_options", "git_merge_driver_source_repo",
+                            "git_repository_config_snapshot"));
+    EXPECT_THAT(steps_, ElementsAre("git_repository_config_snapshot", "git_config_get_entry",
+                                    "git_repository_odb", "git_odb_read", "git_odb_object_free",
+                                    "git_odb_free", "git_repository_odb", "git_odb_read",
+                                    "git_odb_object_free", "git_odb_free", "git_repository_odb",
+                                    "git_odb_read", "git_odb_object_free", "git_odb_free",
+                                    "git_buf_set", "git_config_entry_free", "git_config_free"));
     // The temporary files go before the configuration.
     EXPECT_THAT(filesAtRelease, ElementsAre(true));
     EXPECT_EQ(answer.path, "file");
@@ -205,7 +239,7 @@ TEST_F(MergeDriverEntry, ReadsNoResultOfARefusal)
     defineScript("echo merged >\"$2\"; exit 1");
     const Answer answer = apply();
     EXPECT_EQ(answer.code, GIT_EMERGECONFLICT);
-    EXPECT_THAT(calls_.names, testing::Not(testing::Contains("buf_set")));
+    EXPECT_THAT(names_, Not(Contains("git_buf_set")));
     EXPECT_FALSE(answer.path);
     EXPECT_FALSE(answer.mode);
     EXPECT_EQ(answer.content, "");
@@ -216,39 +250,37 @@ TEST_F(MergeDriverEntry, PassesTheFileOnWhateverKeepsTheKeyFromBeingRead)
     defineScript("exit 0");
     for (const int code : {-3, -1, -12, 1})
     {
-        calls_.names.clear();
-        calls_.onGetEntry = [code] { return code; };
+        calls_.fail({{"git_config_get_entry", code}});
         const LogCapture log(0x200);
         const Answer answer = apply();
         EXPECT_EQ(answer.code, GIT_PASSTHROUGH);
         EXPECT_THAT(log.messages(), ElementsAre("Merge driver merge.tool.driver not found"));
         EXPECT_EQ(answer.exception, nullptr);
-        EXPECT_EQ(calls_.names.back(), "config_free");
-        EXPECT_THAT(calls_.names, testing::Not(testing::Contains("odb")));
+        EXPECT_EQ(steps_.back(), "git_config_free");
+        EXPECT_THAT(names_, Not(Contains("git_repository_odb")));
     }
 }
 
 TEST_F(MergeDriverEntry, StoresTheFailureOfTheSnapshot)
 {
     defineScript("exit 0");
-    calls_.onSnapshot = [] { return GIT_ELOCKED; };
+    calls_.fail({{"git_repository_config_snapshot", GIT_ELOCKED}});
     const Answer answer = apply();
     EXPECT_EQ(answer.code, GIT_EUSER);
     EXPECT_EQ(codeOf(answer.exception), GIT_ELOCKED);
-    EXPECT_EQ(calls_.names.back(), "config_snapshot");
+    EXPECT_EQ(steps_.back(), "git_repository_config_snapshot");
 }
 
 TEST_F(MergeDriverEntry, StoresTheFailureOfAnySideAndRemovesTheFilesBefore)
 {
     defineScript("exit 0");
-    for (int failing = 0; failing < 3; ++failing)
+    for (std::size_t failing = 1; failing <= 3; ++failing)
     {
-        int reads = 0;
-        calls_.onReadBlob = [&] { return reads++ == failing ? GIT_EINVALID : 0; };
+        calls_.fail({{"git_odb_read", GIT_EINVALID, failing}});
         const Answer answer = apply();
         EXPECT_EQ(answer.code, GIT_EUSER);
         EXPECT_EQ(codeOf(answer.exception), GIT_EINVALID);
-        EXPECT_EQ(reads, failing + 1);
+        EXPECT_THAT(names_, Contains("git_odb_read").Times(static_cast<int>(failing)));
         EXPECT_FALSE(answer.path);
     }
 }
@@ -256,13 +288,13 @@ TEST_F(MergeDriverEntry, StoresTheFailureOfAnySideAndRemovesTheFilesBefore)
 TEST_F(MergeDriverEntry, LeavesPathAndModeWhenTheResultCannotBeHandedOver)
 {
     defineScript("exit 0");
-    calls_.onSetBuffer = [] { return GIT_ERROR; };
+    calls_.fail({{"git_buf_set", GIT_ERROR}});
     const Answer answer = apply();
     EXPECT_EQ(answer.code, GIT_EUSER);
     EXPECT_EQ(codeOf(answer.exception), GIT_ERROR);
     EXPECT_FALSE(answer.path);
     EXPECT_FALSE(answer.mode);
-    EXPECT_EQ(calls_.names.back(), "config_free");
+    EXPECT_EQ(steps_.back(), "git_config_free");
 }
 
 TEST_F(MergeDriverEntry, WritesTheMarkerSizeInDecimal)
@@ -271,7 +303,7 @@ TEST_F(MergeDriverEntry, WritesTheMarkerSizeInDecimal)
     defineScript("echo $4 >" + out);
     for (const std::uint16_t size : std::vector<std::uint16_t>{0, 7, 12, 32768, 65535})
     {
-        calls_.options.marker_size = size;
+        source_.options.marker_size = size;
         EXPECT_EQ(apply().code, 0);
         EXPECT_EQ(Scripts::read(out), std::to_string(size) + '\n');
     }
@@ -346,37 +378,37 @@ TEST_F(MergeDriverEntry, EndsTheProcessWhenTheReportOfAnExceptionFails)
 
 TEST(MergeDriverGuard, RegistersBetweenStartAndShutdown)
 {
-    MergeDriverCalls calls;
+    LibGit2Recorder calls;
     {
         const git::LibGit2Guard guard;
-        EXPECT_THAT(calls.names, ElementsAre("init", "register"));
+        EXPECT_THAT(calls.names(), ElementsAre("git_libgit2_init", "git_merge_driver_register"));
     }
-    EXPECT_THAT(calls.names, ElementsAre("init", "register", "unregister", "shutdown"));
+    EXPECT_THAT(calls.names(), ElementsAre("git_libgit2_init", "git_merge_driver_register",
+                                           "git_merge_driver_unregister", "git_libgit2_shutdown"));
 }
 
 TEST(MergeDriverGuard, LooksAtNoResult)
 {
-    MergeDriverCalls calls;
+    LibGit2Recorder calls;
     for (const int code : {GIT_ERROR, GIT_EEXISTS, GIT_ENOTFOUND})
     {
-        calls.onRegister = [code] { return code; };
-        calls.onUnregister = [code] { return code; };
+        calls.fail({{"git_merge_driver_register", code}, {"git_merge_driver_unregister", code}});
         EXPECT_NO_THROW(git::LibGit2Guard());
     }
 }
 
 TEST(MergeDriverGuard, TellsOfTheEndBeforeIt)
 {
-    MergeDriverCalls calls;
+    LibGit2Recorder calls;
     LogCapture log;
     std::vector<std::string> callsBefore;
-    log.onRecord([&](const LogRecord &) { callsBefore = calls.names; });
+    log.onRecord([&](const LogRecord &) { callsBefore = calls.names(); });
     {
         const git::LibGit2Guard guard;
         EXPECT_THAT(log.messages(), IsEmpty());
     }
     EXPECT_THAT(log.messages(), ElementsAre("Unregister merge driver: *"));
-    EXPECT_THAT(callsBefore, ElementsAre("init", "register"));
+    EXPECT_THAT(callsBefore, ElementsAre("git_libgit2_init", "git_merge_driver_register"));
 }
 
 } // namespace
