@@ -8,8 +8,8 @@
 #include <git2.h>
 #include <gtest/gtest.h>
 
-#include "BranchCalls.hpp"
 #include "MergeTest.hpp"
+#include "support/libgit2/LibGit2Recorder.hpp"
 
 namespace vclink::test
 {
@@ -21,6 +21,23 @@ class BranchCallsTest : public MergeTest
   protected:
     using Calls = std::vector<std::string>;
 
+    /// Collects the records that the calls are given.
+    void collectRecords(LibGit2Recorder &calls)
+    {
+        calls.on<git_checkout_tree>(
+            [this](git_repository *, const git_object *, const git_checkout_options *options)
+            { collectCheckout(*options); });
+        calls.on<git_checkout_index>(
+            [this](git_repository *, git_index *, const git_checkout_options *options)
+            { collectCheckout(*options); });
+        calls.on<git_merge>(
+            [this](git_repository *, const git_annotated_commit **, std::size_t,
+                   const git_merge_options *options, const git_checkout_options *checkout)
+            {
+                merges_.push_back(*options);
+                collectCheckout(*checkout);
+            });
+    }
     void expectCheckoutRecord(const git_checkout_options &record, unsigned strategy) const
     {
         EXPECT_EQ(record.version, 1U);
@@ -38,7 +55,20 @@ class BranchCallsTest : public MergeTest
         EXPECT_EQ(record.file_open_flags, O_CREAT | O_TRUNC | O_WRONLY | O_NOFOLLOW);
     }
 
-    const LibGit2Failure injected_{GIT_ERROR, GIT_ERROR_OS, "injected"};
+    const LibGit2Failure injected_{GIT_ERROR, GIT_ERROR_OS, injectedText};
+    /// The records of git_checkout_tree, git_checkout_index and git_merge, in order, and their
+    /// paths.
+    std::vector<git_checkout_options> checkouts_;
+    std::vector<Calls> checkoutPaths_;
+    std::vector<git_merge_options> merges_;
+
+  private:
+    void collectCheckout(const git_checkout_options &options)
+    {
+        checkouts_.push_back(options);
+        checkoutPaths_.emplace_back(options.paths.strings,
+                                    options.paths.strings + options.paths.count);
+    }
 };
 
 } // namespace vclink::test

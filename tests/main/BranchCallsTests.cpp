@@ -7,6 +7,7 @@
 #include <gtest/gtest.h>
 
 #include "BranchCallsTest.hpp"
+#include "support/libgit2/LibGit2Recorder.hpp"
 
 namespace
 {
@@ -15,8 +16,8 @@ namespace git = vclink::git;
 using testing::ElementsAre;
 using testing::IsEmpty;
 using testing::SizeIs;
-using vclink::test::BranchCalls;
 using vclink::test::libGit2FailureOf;
+using vclink::test::LibGit2Recorder;
 using vclink::test::NothingChanges;
 using vclink::test::stateOf;
 
@@ -28,11 +29,12 @@ class CallsOnBranches : public vclink::test::BranchCallsTest
     {
         for (const auto &name : names)
         {
-            BranchCalls calls;
-            calls.failing[name] = GIT_ERROR;
+            LibGit2Recorder calls;
+            calls.fail({{name, GIT_ERROR}});
             EXPECT_EQ(libGit2FailureOf(action), injected_) << name;
-            EXPECT_EQ(calls.names.back(),
-                      name == "repository_open_ext" ? "repository_open_ext" : "repository_free")
+            EXPECT_EQ(calls.steps().back(), name == "git_repository_open_ext"
+                                                ? "git_repository_open_ext"
+                                                : "git_repository_free")
                 << name;
         }
     }
@@ -40,53 +42,58 @@ class CallsOnBranches : public vclink::test::BranchCallsTest
 
 TEST_F(CallsOnBranches, OfAListAreTheseInOrder)
 {
-    BranchCalls calls;
+    LibGit2Recorder calls;
     branches().getLocalBranches();
-    EXPECT_THAT(calls.names, ElementsAre("repository_open_ext", "branch_iterator_new",
-                                         "branch_next", "reference_free", "branch_next",
-                                         "branch_iterator_free", "repository_free"));
+    EXPECT_THAT(calls.steps(),
+                ElementsAre("git_repository_open_ext", "git_branch_iterator_new", "git_branch_next",
+                            "git_reference_free", "git_branch_next", "git_branch_iterator_free",
+                            "git_repository_free"));
 }
 
 TEST_F(CallsOnBranches, OfAListAreRaisedWhenTheyFail)
 {
-    expectEachRaised({"repository_open_ext", "branch_iterator_new", "branch_next"},
+    expectEachRaised({"git_repository_open_ext", "git_branch_iterator_new", "git_branch_next"},
                      [this] { branches().getLocalBranches(); });
-    expectEachRaised({"repository_open_ext", "branch_iterator_new", "branch_next"},
+    expectEachRaised({"git_repository_open_ext", "git_branch_iterator_new", "git_branch_next"},
                      [this] { branches().getRemoteBranches(); });
 }
 
 TEST_F(CallsOnBranches, OfAListEndIt)
 {
-    BranchCalls calls;
-    calls.failing["branch_next"] = GIT_ITEROVER;
+    LibGit2Recorder calls;
+    calls.fail({{"git_branch_next", GIT_ITEROVER}});
     EXPECT_THAT(branches().getLocalBranches(), IsEmpty());
 }
 
 TEST_F(CallsOnBranches, OfASwitchAreTheseInOrder)
 {
     makeAhead();
-    BranchCalls calls;
+    LibGit2Recorder calls;
     branches().switchBranch("topic");
-    EXPECT_THAT(calls.names, ElementsAre("repository_open_ext", "branch_lookup", "revparse_single",
-                                         "checkout_tree", "repository_set_head", "object_free",
-                                         "reference_free", "repository_free"));
+    EXPECT_THAT(calls.steps(),
+                ElementsAre("git_repository_open_ext", "git_branch_lookup", "git_revparse_single",
+                            "git_checkout_options_init", "git_checkout_tree",
+                            "git_repository_set_head", "git_object_free", "git_reference_free",
+                            "git_repository_free"));
 }
 
 TEST_F(CallsOnBranches, OfASwitchHaveTheRecordOfASafeCheckout)
 {
     makeAhead();
-    BranchCalls calls;
+    LibGit2Recorder calls;
+    collectRecords(calls);
     branches().switchBranch("topic");
-    ASSERT_THAT(calls.checkouts, SizeIs(1));
-    expectCheckoutRecord(calls.checkouts[0], 1);
-    EXPECT_THAT(calls.checkoutPaths[0], IsEmpty());
+    ASSERT_THAT(checkouts_, SizeIs(1));
+    expectCheckoutRecord(checkouts_[0], 1);
+    EXPECT_THAT(checkoutPaths_[0], IsEmpty());
 }
 
 TEST_F(CallsOnBranches, OfASwitchAreRaisedWhenTheyFail)
 {
     makeAhead();
     const NothingChanges nothing(repository_);
-    expectEachRaised({"repository_open_ext", "branch_lookup", "revparse_single", "checkout_tree"},
+    expectEachRaised({"git_repository_open_ext", "git_branch_lookup", "git_revparse_single",
+                      "git_checkout_tree"},
                      [this] { branches().switchBranch("topic"); });
 }
 
@@ -94,23 +101,24 @@ TEST_F(CallsOnBranches, OfASwitchLeaveTheHeadWhenItCannotBeSet)
 {
     makeAhead();
     const std::string head = stateOf(repository_).head;
-    expectEachRaised({"repository_set_head"}, [this] { branches().switchBranch("topic"); });
+    expectEachRaised({"git_repository_set_head"}, [this] { branches().switchBranch("topic"); });
     EXPECT_EQ(stateOf(repository_).head, head);
 }
 
 TEST_F(CallsOnBranches, OfANewBranchAreTheseInOrder)
 {
-    BranchCalls calls;
+    LibGit2Recorder calls;
     branches().createBranch(git::BranchParameters("new", "main"));
-    EXPECT_THAT(calls.names, ElementsAre("repository_open_ext", "reference_dwim", "object_lookup",
-                                         "reference_free", "branch_create", "reference_free",
-                                         "object_free", "repository_free"));
+    EXPECT_THAT(calls.steps(),
+                ElementsAre("git_repository_open_ext", "git_reference_dwim", "git_commit_lookup",
+                            "git_reference_free", "git_branch_create", "git_reference_free",
+                            "git_commit_free", "git_repository_free"));
 }
 
 TEST_F(CallsOnBranches, OfANewBranchAreRaisedWhenTheyFail)
 {
     const NothingChanges nothing(repository_);
-    expectEachRaised({"repository_open_ext", "reference_dwim", "branch_create"},
+    expectEachRaised({"git_repository_open_ext", "git_reference_dwim", "git_branch_create"},
                      [this] { branches().createBranch(git::BranchParameters("new", "main")); });
 }
 
@@ -119,24 +127,26 @@ TEST_F(CallsOnBranches, OfADeletionAreTheseInOrderAndRaised)
     repository_.git({"branch", "old"});
     {
         const NothingChanges nothing(repository_);
-        expectEachRaised({"repository_open_ext", "branch_lookup", "branch_delete"},
+        expectEachRaised({"git_repository_open_ext", "git_branch_lookup", "git_branch_delete"},
                          [this] { branches().deleteBranch("old"); });
     }
-    BranchCalls calls;
+    LibGit2Recorder calls;
     branches().deleteBranch("old");
-    EXPECT_THAT(calls.names, ElementsAre("repository_open_ext", "branch_lookup", "branch_delete",
-                                         "reference_free", "repository_free"));
+    EXPECT_THAT(calls.steps(),
+                ElementsAre("git_repository_open_ext", "git_branch_lookup", "git_branch_delete",
+                            "git_reference_free", "git_repository_free"));
 }
 
 TEST_F(CallsOnBranches, OfTheCurrentBranchAreTheseInOrderAndRaised)
 {
     {
-        BranchCalls calls;
+        LibGit2Recorder calls;
         EXPECT_EQ(branches().getCurrentBranch().getName(), "main");
-        EXPECT_THAT(calls.names, ElementsAre("repository_open_ext", "repository_head",
-                                             "branch_name", "reference_free", "repository_free"));
+        EXPECT_THAT(calls.steps(),
+                    ElementsAre("git_repository_open_ext", "git_repository_head", "git_branch_name",
+                                "git_reference_free", "git_repository_free"));
     }
-    expectEachRaised({"repository_open_ext", "repository_head", "branch_name"},
+    expectEachRaised({"git_repository_open_ext", "git_repository_head", "git_branch_name"},
                      [this] { branches().getCurrentBranch(); });
 }
 

@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: MIT
+#include <cstdint>
 #include <memory>
 #include <optional>
 #include <string>
@@ -9,9 +10,9 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "BranchCalls.hpp"
 #include "BranchTest.hpp"
 #include "GitConfigTest.hpp"
+#include "support/libgit2/LibGit2Recorder.hpp"
 #include "support/text.hpp"
 #include "vclink/git/GitAttributes.hpp"
 #include "vclink/git/GitException.hpp"
@@ -22,9 +23,9 @@ namespace
 namespace git = vclink::git;
 using testing::ElementsAre;
 using vclink::test::asPath;
-using vclink::test::BranchCalls;
 using vclink::test::LibGit2Failure;
 using vclink::test::libGit2FailureOf;
+using vclink::test::LibGit2Recorder;
 
 const LibGit2Failure injected{GIT_ERROR, GIT_ERROR_OS, "injected"};
 
@@ -43,56 +44,59 @@ class AttributeCalls : public vclink::test::BranchTest
 
 TEST_F(AttributeCalls, OfTheCreationFlushARepositoryThatIsReleasedAtOnce)
 {
-    BranchCalls calls;
+    LibGit2Recorder calls;
     create();
-    EXPECT_THAT(calls.names,
-                ElementsAre("repository_open_ext", "attr_cache_flush", "repository_free"));
+    EXPECT_THAT(calls.steps(), ElementsAre("git_repository_open_ext", "git_attr_cache_flush",
+                                           "git_repository_free"));
 }
 
 TEST_F(AttributeCalls, OfTheFlushMayFail)
 {
-    BranchCalls calls;
-    calls.failing["attr_cache_flush"] = GIT_ERROR;
+    LibGit2Recorder calls;
+    calls.fail({{"git_attr_cache_flush", GIT_ERROR}});
     EXPECT_EQ(serialize(create()->getAttribute(asPath("a"), u"x")), "x=raw");
 }
 
 TEST_F(AttributeCalls, OfAQueryAreTheseInOrder)
 {
     const auto attributes = create();
-    BranchCalls calls;
+    LibGit2Recorder calls;
+    calls.on<git_attr_get>([](const char **, git_repository *, std::uint32_t flags, const char *,
+                              const char *) { EXPECT_EQ(flags, 0U); });
     attributes->getAttribute(asPath("a"), u"x");
     attributes->getAttribute(asPath("a"), u"x");
-    EXPECT_THAT(calls.names,
-                ElementsAre("repository_open_ext", "attr_get", "attr_value", "repository_free",
-                            "repository_open_ext", "attr_get", "attr_value", "repository_free"));
-    EXPECT_THAT(calls.attributeFlags, testing::Each(0U));
+    EXPECT_THAT(calls.names(),
+                ElementsAre("git_repository_open_ext", "git_attr_get", "git_attr_value",
+                            "git_repository_free", "git_repository_open_ext", "git_attr_get",
+                            "git_attr_value", "git_repository_free"));
 }
 
 TEST_F(AttributeCalls, OfAQueryAreRaisedWhenTheyFail)
 {
     const auto attributes = create();
-    for (const std::string name : {"repository_open_ext", "attr_get"})
+    for (const std::string name : {"git_repository_open_ext", "git_attr_get"})
     {
-        BranchCalls calls;
-        calls.failing[name] = GIT_ERROR;
+        LibGit2Recorder calls;
+        calls.fail({{name, GIT_ERROR}});
         EXPECT_EQ(libGit2FailureOf([&] { attributes->getAttribute(asPath("a"), u"x"); }), injected)
             << name;
-        EXPECT_EQ(calls.names.back(), name == "attr_get" ? "repository_free" : name);
+        EXPECT_EQ(calls.steps().back(), name == "git_attr_get" ? "git_repository_free" : name);
     }
 }
 
 TEST_F(AttributeCalls, OfTheCreationAreRaisedWhenTheRepositoryCannotBeOpened)
 {
-    BranchCalls calls;
-    calls.failing["repository_open_ext"] = GIT_ERROR;
+    LibGit2Recorder calls;
+    calls.fail({{"git_repository_open_ext", GIT_ERROR}});
     EXPECT_EQ(libGit2FailureOf([&] { create(); }), injected);
 }
 
 TEST_F(AttributeCalls, ThatGiveAnUnknownStateAreRaisedWithTheRawValue)
 {
     const auto attributes = create();
-    BranchCalls calls;
-    calls.onAttributeValue = [] { return 4; };
+    LibGit2Recorder calls;
+    int unknown = 4;
+    calls.answer<git_attr_value>([&](auto...) { return static_cast<git_attr_value_t>(unknown); });
     try
     {
         attributes->getAttribute(asPath("a"), u"x");
@@ -107,7 +111,7 @@ TEST_F(AttributeCalls, ThatGiveAnUnknownStateAreRaisedWithTheRawValue)
         ASSERT_EQ(arguments.size(), 1U);
         EXPECT_EQ(boost::get<std::string>(arguments[0]), "raw");
     }
-    EXPECT_EQ(calls.names.back(), "repository_free");
+    EXPECT_EQ(calls.steps().back(), "git_repository_free");
 }
 
 class ConfigCalls : public vclink::test::GitConfigTest
@@ -116,33 +120,36 @@ class ConfigCalls : public vclink::test::GitConfigTest
 
 TEST_F(ConfigCalls, OfALifeAreTheseInOrder)
 {
-    BranchCalls calls;
+    LibGit2Recorder calls;
     {
         const git::GitConfig config;
-        EXPECT_THAT(calls.names, ElementsAre("libgit2_init", "merge_driver_register",
-                                             "config_open_default", "config_open_global"));
-        calls.names.clear();
+        EXPECT_THAT(calls.steps(),
+                    ElementsAre("git_libgit2_init", "git_merge_driver_register",
+                                "git_config_open_default", "git_config_open_global"));
+        calls.clear();
     }
-    EXPECT_THAT(calls.names, ElementsAre("config_free", "config_free", "merge_driver_unregister",
-                                         "libgit2_shutdown"));
+    EXPECT_THAT(calls.steps(), ElementsAre("git_config_free", "git_config_free",
+                                           "git_merge_driver_unregister", "git_libgit2_shutdown"));
 }
 
 TEST_F(ConfigCalls, OfTheConstructorAreRaisedAndWhatWasOpenedIsReleased)
 {
     {
-        BranchCalls calls;
-        calls.failing["config_open_default"] = GIT_ERROR;
+        LibGit2Recorder calls;
+        calls.fail({{"git_config_open_default", GIT_ERROR}});
         EXPECT_EQ(libGit2FailureOf([] { git::GitConfig config; }), injected);
-        EXPECT_THAT(calls.names,
-                    ElementsAre("libgit2_init", "merge_driver_register", "config_open_default",
-                                "merge_driver_unregister", "libgit2_shutdown"));
+        EXPECT_THAT(calls.steps(),
+                    ElementsAre("git_libgit2_init", "git_merge_driver_register",
+                                "git_config_open_default", "git_merge_driver_unregister",
+                                "git_libgit2_shutdown"));
     }
-    BranchCalls calls;
-    calls.failing["config_open_global"] = GIT_ERROR;
+    LibGit2Recorder calls;
+    calls.fail({{"git_config_open_global", GIT_ERROR}});
     EXPECT_EQ(libGit2FailureOf([] { git::GitConfig config; }), injected);
-    EXPECT_THAT(calls.names, ElementsAre("libgit2_init", "merge_driver_register",
-                                         "config_open_default", "config_open_global", "config_free",
-                                         "merge_driver_unregister", "libgit2_shutdown"));
+    EXPECT_THAT(calls.steps(),
+                ElementsAre("git_libgit2_init", "git_merge_driver_register",
+                            "git_config_open_default", "git_config_open_global", "git_config_free",
+                            "git_merge_driver_unregister", "git_libgit2_shutdown"));
 }
 
 TEST_F(ConfigCalls, OfAReadAreOneAndDroppedWhenTheyFail)
@@ -150,12 +157,12 @@ TEST_F(ConfigCalls, OfAReadAreOneAndDroppedWhenTheyFail)
     const vclink::test::InstallPath installation("/opt/host");
     git::GitConfig config;
     config.writeDiffTool();
-    BranchCalls calls;
+    LibGit2Recorder calls;
     EXPECT_NE(config.readDiffTool(), std::nullopt);
-    EXPECT_THAT(calls.names, ElementsAre("config_get_string_buf"));
+    EXPECT_THAT(calls.steps(), ElementsAre("git_config_get_string_buf"));
     for (const int code : {GIT_ERROR, GIT_ENOTFOUND, GIT_EUSER})
     {
-        calls.failing["config_get_string_buf"] = code;
+        calls.fail({{"git_config_get_string_buf", code}});
         EXPECT_EQ(config.readDiffTool(), std::nullopt);
         EXPECT_EQ(config.readMergeTool(), std::nullopt);
         EXPECT_EQ(config.readAutoMergeDriver(), std::nullopt);
@@ -165,10 +172,10 @@ TEST_F(ConfigCalls, OfAReadAreOneAndDroppedWhenTheyFail)
 TEST_F(ConfigCalls, OfAWriteReadNothingFirstAndAreRaisedWhenTheyFail)
 {
     git::GitConfig config;
-    BranchCalls calls;
+    LibGit2Recorder calls;
     config.writeMergeTool();
-    EXPECT_THAT(calls.names, ElementsAre("config_set_string"));
-    calls.failing["config_set_string"] = GIT_ERROR;
+    EXPECT_THAT(calls.steps(), ElementsAre("git_config_set_string"));
+    calls.fail({{"git_config_set_string", GIT_ERROR}});
     EXPECT_EQ(libGit2FailureOf([&] { config.writeMergeTool(); }), injected);
     EXPECT_EQ(libGit2FailureOf([&] { config.writeDiffTool(); }), injected);
     EXPECT_EQ(libGit2FailureOf([&] { config.writeAutoMergeDriver(); }), injected);
@@ -178,10 +185,10 @@ TEST_F(ConfigCalls, OfThePathAreOneAndDroppedWhenTheyFail)
 {
     git::GitConfig config;
     config.writeMergeTool();
-    BranchCalls calls;
+    LibGit2Recorder calls;
     EXPECT_NE(config.globalFilePath(), std::nullopt);
-    EXPECT_THAT(calls.names, ElementsAre("config_find_global"));
-    calls.failing["config_find_global"] = GIT_ERROR;
+    EXPECT_THAT(calls.steps(), ElementsAre("git_config_find_global"));
+    calls.fail({{"git_config_find_global", GIT_ERROR}});
     EXPECT_EQ(config.globalFilePath(), std::nullopt);
 }
 

@@ -11,9 +11,9 @@
 #include <gtest/gtest.h>
 
 #include "AdapterTest.hpp"
-#include "LibGit2Calls.hpp"
 #include "error/errorUtil/callbackException.hpp"
 #include "support/FailingAllocations.hpp"
+#include "support/libgit2/LibGit2Recorder.hpp"
 #include "support/text.hpp"
 #include "vclink/git/GitAdapterFactory.hpp"
 
@@ -81,18 +81,17 @@ TEST_F(FailingAllocation, EndsAStatusWalkInItsCallback)
     for (std::size_t i = 0; i < files; ++i)
         repository.write("a/folder/of/some/depth/file" + std::to_string(i), "x");
     const auto adapter = makeAdapter(repository.path());
-    vclink::test::LibGit2Calls calls;
+    vclink::test::LibGit2Recorder calls;
     int succeed = INT_MAX;
     bool hasFailed = false;
-    calls.onStatusForeach = [&](vclink::test::LibGit2Calls::Walk real, git_repository *opened,
-                                const git_status_options *options, git_status_cb callback,
-                                void *payload)
-    {
-        vclink::test::letAllocationsSucceed(succeed);
-        const int code = real(opened, options, callback, payload);
-        hasFailed = vclink::test::letAllAllocationsSucceed();
-        return code;
-    };
+    calls.answer<git_status_foreach_ext>(
+        [&](auto real, auto... arguments)
+        {
+            vclink::test::letAllocationsSucceed(succeed);
+            const int code = real(arguments...);
+            hasFailed = vclink::test::letAllAllocationsSucceed();
+            return code;
+        });
     // The logger and the slot come into being at their first use, which is not meant here.
     adapter->getFolderStates(adapter->getRootFolder());
     pendingCallbackException() = nullptr;

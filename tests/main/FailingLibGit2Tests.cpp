@@ -2,14 +2,15 @@
 #include <climits>
 #include <memory>
 
+#include <git2.h>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "LibGit2Calls.hpp"
 #include "main/libgit2Features.hpp"
 #include "support/GitTest.hpp"
 #include "support/LibGit2Session.hpp"
 #include "support/TestInteractor.hpp"
+#include "support/libgit2/LibGit2Recorder.hpp"
 #include "support/text.hpp"
 #include "vclink/git/GitAdapterFactory.hpp"
 #include "vclink/git/LibGit2Guard.hpp"
@@ -23,7 +24,7 @@ using vclink::git::GitAdapterFactory;
 using vclink::git::LibGit2Guard;
 using vclink::git::LibGit2Version;
 using vclink::test::asPath;
-using vclink::test::LibGit2Calls;
+using vclink::test::LibGit2Recorder;
 
 class FailingLibGit2 : public vclink::test::GitTest
 {
@@ -33,19 +34,20 @@ TEST_F(FailingLibGit2, GoesUnnoticedByAGuard)
 {
     // The guard registers its driver all the same, which a libgit2 that never ends would keep.
     const vclink::test::LibGit2Session session(environment());
-    LibGit2Calls calls;
-    calls.onInit = [] { return -1; };
-    calls.onShutdown = [] { return -1; };
+    LibGit2Recorder calls;
+    calls.answer<git_libgit2_init>([](auto...) { return -1; });
+    calls.answer<git_libgit2_shutdown>([](auto...) { return -1; });
     {
         const LibGit2Guard guard;
     }
-    EXPECT_THAT(calls.names, ElementsAre("git_libgit2_init", "git_libgit2_shutdown"));
+    EXPECT_THAT(calls.steps(), ElementsAre("git_libgit2_init", "git_merge_driver_register",
+                                           "git_merge_driver_unregister", "git_libgit2_shutdown"));
 }
 
 TEST_F(FailingLibGit2, LeavesTheVersionsNumbersAtMinusOne)
 {
-    LibGit2Calls calls;
-    calls.onVersion = [](int *, int *, int *) { return -1; };
+    LibGit2Recorder calls;
+    calls.answer<git_libgit2_version>([](auto...) { return -1; });
     const LibGit2Version version;
     EXPECT_EQ(version.getMajor(), -1);
     EXPECT_EQ(version.getMinor(), -1);
@@ -55,60 +57,67 @@ TEST_F(FailingLibGit2, LeavesTheVersionsNumbersAtMinusOne)
 
 TEST_F(FailingLibGit2, GivesAVersionOfAnyLengthItsText)
 {
-    LibGit2Calls calls;
-    calls.onVersion = [](int *major, int *minor, int *revision)
-    {
-        *major = INT_MAX;
-        *minor = INT_MIN;
-        *revision = 7;
-        return 0;
-    };
+    LibGit2Recorder calls;
+    calls.answer<git_libgit2_version>(
+        [](auto, int *major, int *minor, int *revision)
+        {
+            *major = INT_MAX;
+            *minor = INT_MIN;
+            *revision = 7;
+            return 0;
+        });
     EXPECT_EQ(LibGit2Version().toString(), "2147483647.-2147483648.7");
-    EXPECT_THAT(calls.names, ElementsAre("git_libgit2_version"));
+    EXPECT_THAT(calls.steps(), ElementsAre("git_libgit2_version"));
 }
 
 TEST_F(FailingLibGit2, GivesItsFourFeaturesAndNoOthers)
 {
-    LibGit2Calls calls;
+    LibGit2Recorder calls;
     for (int feature = 1; feature < 0x100; feature <<= 1)
     {
-        calls.onFeatures = [feature] { return feature; };
+        calls.answer<git_libgit2_features>([feature](auto...) { return feature; });
         EXPECT_EQ(vclink::git::libgit2Features(), feature <= 8 ? feature : 0) << feature;
     }
-    calls.onFeatures = [] { return -1; };
+    calls.answer<git_libgit2_features>([](auto...) { return -1; });
     EXPECT_EQ(vclink::git::libgit2Features(), 15);
 }
 
 TEST_F(FailingLibGit2, IsStartedAndEndedAroundAProbe)
 {
     const auto repository = makeRepository();
-    LibGit2Calls calls;
+    LibGit2Recorder calls;
+    calls.on<git_repository_open_ext>([](git_repository **out, auto...)
+                                      { EXPECT_EQ(out, nullptr); });
     EXPECT_TRUE(GitAdapterFactory().isAdapterFor(asPath(repository.path())));
-    EXPECT_THAT(calls.names, ElementsAre("git_libgit2_init", "git_repository_open_ext(nullptr)",
-                                         "git_libgit2_shutdown"));
+    EXPECT_THAT(calls.steps(), ElementsAre("git_libgit2_init", "git_merge_driver_register",
+                                           "git_repository_open_ext", "git_merge_driver_unregister",
+                                           "git_libgit2_shutdown"));
 }
 
 TEST_F(FailingLibGit2, IsProbedWithoutASearch)
 {
-    LibGit2Calls calls;
-    calls.onOpen = [](const char *, unsigned flags, const char *ceilings)
-    {
-        EXPECT_EQ(flags, 1U);
-        EXPECT_EQ(ceilings, nullptr);
-    };
+    LibGit2Recorder calls;
+    calls.on<git_repository_open_ext>(
+        [](git_repository **, const char *, unsigned flags, const char *ceilings)
+        {
+            EXPECT_EQ(flags, 1U);
+            EXPECT_EQ(ceilings, nullptr);
+        });
     EXPECT_FALSE(GitAdapterFactory().isAdapterFor(asPath(folder().path())));
+    EXPECT_THAT(calls.steps(), testing::Contains("git_repository_open_ext"));
 }
 
 TEST_F(FailingLibGit2, IsStartedByAnAdapterThatOpensNothing)
 {
     const auto interactor = std::make_shared<vclink::test::TestInteractor>();
-    LibGit2Calls calls;
+    LibGit2Recorder calls;
     auto adapter = GitAdapterFactory().createAdapterFor(asPath(folder().path()), interactor);
-    EXPECT_THAT(calls.names, ElementsAre("git_libgit2_init"));
+    EXPECT_THAT(calls.steps(), ElementsAre("git_libgit2_init", "git_merge_driver_register"));
     adapter->getRootFolder();
     adapter->getFileStates({});
     adapter.reset();
-    EXPECT_THAT(calls.names, ElementsAre("git_libgit2_init", "git_libgit2_shutdown"));
+    EXPECT_THAT(calls.steps(), ElementsAre("git_libgit2_init", "git_merge_driver_register",
+                                           "git_merge_driver_unregister", "git_libgit2_shutdown"));
 }
 
 } // namespace

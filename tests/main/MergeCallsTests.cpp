@@ -1,15 +1,19 @@
 // SPDX-License-Identifier: MIT
 // The calls to libgit2 of a merge.
 #include <algorithm>
+#include <cstdint>
 #include <iterator>
 #include <string>
+#include <tuple>
 
+#include <git2.h>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include "BranchCallsTest.hpp"
 #include "error/logging/severity.hpp"
 #include "support/LogCapture.hpp"
+#include "support/libgit2/LibGit2Recorder.hpp"
 #include "vclink/git/messageIdentifiers.hpp"
 
 namespace
@@ -19,7 +23,7 @@ namespace git = vclink::git;
 using testing::ElementsAre;
 using testing::IsEmpty;
 using testing::SizeIs;
-using vclink::test::BranchCalls;
+using vclink::test::LibGit2Recorder;
 using vclink::test::LogCapture;
 using vclink::test::NothingChanges;
 using vclink::test::textOf;
@@ -44,6 +48,19 @@ class CallsOfAMerge : public vclink::test::BranchCallsTest
                 repository_.write("binary", "theirs\n");
             });
     }
+    /// Expects the values that libgit2 gives.
+    static void expectUnchanged(const git_merge_options &options)
+    {
+        git_merge_options initial;
+        git_merge_options_init(&initial, GIT_MERGE_OPTIONS_VERSION);
+        const auto members = [](const git_merge_options &from)
+        {
+            return std::tie(from.version, from.flags, from.rename_threshold, from.target_limit,
+                            from.metric, from.recursion_limit, from.default_driver, from.file_favor,
+                            from.file_flags);
+        };
+        EXPECT_EQ(members(options), members(initial));
+    }
     static void expectBalance(const Calls &calls, const char *made, const char *freed)
     {
         EXPECT_EQ(std::count(calls.begin(), calls.end(), made),
@@ -55,11 +72,12 @@ class CallsOfAMerge : public vclink::test::BranchCallsTest
     {
         for (const auto &name : names)
         {
-            BranchCalls calls;
-            calls.failing[name] = GIT_ERROR;
+            LibGit2Recorder calls;
+            calls.fail({{name, GIT_ERROR}});
             EXPECT_EQ(failureOfMerge("topic"), textOf(injected_)) << name;
-            if (name != "annotated_commit_lookup")
-                expectBalance(calls.names, "annotated_commit_lookup", "annotated_commit_free");
+            if (name != "git_annotated_commit_lookup")
+                expectBalance(calls.steps(), "git_annotated_commit_lookup",
+                              "git_annotated_commit_free");
         }
     }
 };
@@ -67,18 +85,23 @@ class CallsOfAMerge : public vclink::test::BranchCallsTest
 TEST_F(CallsOfAMerge, OfAFastForwardAreTheseInOrder)
 {
     makeAhead();
-    BranchCalls calls;
+    LibGit2Recorder calls;
+    collectRecords(calls);
+    calls.on<git_reference_set_target>(
+        [](git_reference **, git_reference *, const git_oid *, const char *message)
+        { EXPECT_EQ(message, nullptr) << "and nothing for the reflog"; });
     merge("topic");
-    EXPECT_THAT(calls.names,
-                ElementsAre("repository_open_ext", "repository_state", "revparse_single",
-                            "object_free", "annotated_commit_lookup", "merge_analysis",
-                            "repository_head", "object_lookup", "checkout_tree",
-                            "reference_set_target", "reference_free", "object_free",
-                            "reference_free", "annotated_commit_free", "repository_free"))
-        << "and nothing for the reflog";
-    ASSERT_THAT(calls.checkouts, SizeIs(1));
-    expectCheckoutRecord(calls.checkouts[0], 1);
-    EXPECT_THAT(calls.checkoutPaths[0], IsEmpty());
+    EXPECT_THAT(calls.steps(),
+                ElementsAre("git_repository_open_ext", "git_repository_state",
+                            "git_revparse_single", "git_oid_cpy", "git_object_free",
+                            "git_annotated_commit_lookup", "git_merge_analysis",
+                            "git_repository_head", "git_object_lookup", "git_checkout_options_init",
+                            "git_checkout_tree", "git_reference_set_target", "git_reference_free",
+                            "git_object_free", "git_reference_free", "git_annotated_commit_free",
+                            "git_repository_free"));
+    ASSERT_THAT(checkouts_, SizeIs(1));
+    expectCheckoutRecord(checkouts_[0], 1);
+    EXPECT_THAT(checkoutPaths_[0], IsEmpty());
 }
 
 TEST_F(CallsOfAMerge, OfAFastForwardFailTheMergeWhenTheyFail)
@@ -86,45 +109,45 @@ TEST_F(CallsOfAMerge, OfAFastForwardFailTheMergeWhenTheyFail)
     makeAhead();
     {
         const NothingChanges nothing(repository_);
-        expectEachFailsTheMerge({"repository_open_ext", "revparse_single",
-                                 "annotated_commit_lookup", "repository_head", "object_lookup",
-                                 "checkout_tree"});
+        expectEachFailsTheMerge({"git_repository_open_ext", "git_revparse_single",
+                                 "git_annotated_commit_lookup", "git_repository_head",
+                                 "git_object_lookup", "git_checkout_tree"});
     }
     const std::string main = idOf("main");
-    expectEachFailsTheMerge({"reference_set_target"});
+    expectEachFailsTheMerge({"git_reference_set_target"});
     EXPECT_EQ(idOf("main"), main);
 }
 
 TEST_F(CallsOfAMerge, OfAMergeThatIsUpToDateStopAtTheAnalysis)
 {
-    BranchCalls calls;
+    LibGit2Recorder calls;
     merge("main");
-    EXPECT_THAT(calls.names,
-                ElementsAre("repository_open_ext", "repository_state", "revparse_single",
-                            "object_free", "annotated_commit_lookup", "merge_analysis",
-                            "annotated_commit_free", "repository_free"));
+    EXPECT_THAT(calls.steps(), ElementsAre("git_repository_open_ext", "git_repository_state",
+                                           "git_revparse_single", "git_oid_cpy", "git_object_free",
+                                           "git_annotated_commit_lookup", "git_merge_analysis",
+                                           "git_annotated_commit_free", "git_repository_free"));
 }
 
 TEST_F(CallsOfAMerge, OfAMergeThatFailsReleaseAllBeforeTheExceptionIsMade)
 {
     makeDiverged();
-    BranchCalls calls;
-    calls.failing["merge"] = GIT_ERROR;
+    LibGit2Recorder calls;
+    calls.fail({{"git_merge", GIT_ERROR}});
     LogCapture log(git::SeverityException);
     std::string last;
-    log.onRecord([&](const vclink::test::LogRecord &) { last = calls.names.back(); });
+    log.onRecord([&](const vclink::test::LogRecord &) { last = calls.steps().back(); });
     failureOfMerge("topic");
-    EXPECT_EQ(last, "repository_free");
+    EXPECT_EQ(last, "git_repository_free");
 }
 
 TEST_F(CallsOfAMerge, OfAMergeUnderWayStopAtTheState)
 {
-    BranchCalls calls;
-    calls.failing["repository_state"] = GIT_REPOSITORY_STATE_REBASE;
+    LibGit2Recorder calls;
+    calls.fail({{"git_repository_state", GIT_REPOSITORY_STATE_REBASE}});
     EXPECT_EQ(failureOfMerge("topic"),
               textOf(shared_vclink::git::UnableToMergeBadRepositoryState()));
-    EXPECT_THAT(calls.names,
-                ElementsAre("repository_open_ext", "repository_state", "repository_free"));
+    EXPECT_THAT(calls.steps(), ElementsAre("git_repository_open_ext", "git_repository_state",
+                                           "git_repository_free"));
 }
 
 /// No bit is set then, and the merge is a true one.
@@ -133,8 +156,8 @@ TEST_F(CallsOfAMerge, OfTheAnalysisMayFail)
     makeAhead();
     const std::string head = idOf("HEAD");
     {
-        BranchCalls calls;
-        calls.failing["merge_analysis"] = GIT_ERROR;
+        LibGit2Recorder calls;
+        calls.fail({{"git_merge_analysis", GIT_ERROR}});
         const LogCapture log(git::SeverityDiagnostic);
         merge("topic");
         EXPECT_THAT(log.messages(),
@@ -147,35 +170,40 @@ TEST_F(CallsOfAMerge, OfTheAnalysisMayFail)
 TEST_F(CallsOfAMerge, OfACleanMergeAreTheseInOrder)
 {
     makeDiverged();
-    BranchCalls calls;
+    LibGit2Recorder calls;
+    collectRecords(calls);
     merge("topic");
-    ASSERT_GE(calls.names.size(), 12U);
-    const Calls first(calls.names.begin(), calls.names.begin() + 12);
-    EXPECT_THAT(first, ElementsAre("repository_open_ext", "repository_state", "revparse_single",
-                                   "object_free", "annotated_commit_lookup", "merge_analysis",
-                                   "merge", "repository_index", "index_has_conflicts",
-                                   "reference_dwim", "reference_free", "repository_open_ext"));
-    const Calls last(calls.names.end() - 3, calls.names.end());
-    EXPECT_THAT(last, ElementsAre("index_free", "annotated_commit_free", "repository_free"));
-    ASSERT_THAT(calls.checkouts, SizeIs(1));
-    expectCheckoutRecord(calls.checkouts[0], 18);
-    EXPECT_THAT(calls.checkoutPaths[0], IsEmpty());
-    EXPECT_EQ(calls.changedMergeOptions, 0);
+    ASSERT_GE(calls.steps().size(), 15U);
+    const Calls first(calls.steps().begin(), calls.steps().begin() + 15);
+    EXPECT_THAT(first,
+                ElementsAre("git_repository_open_ext", "git_repository_state",
+                            "git_revparse_single", "git_oid_cpy", "git_object_free",
+                            "git_annotated_commit_lookup", "git_merge_analysis",
+                            "git_checkout_options_init", "git_merge_options_init", "git_merge",
+                            "git_repository_index", "git_index_has_conflicts", "git_reference_dwim",
+                            "git_reference_free", "git_repository_open_ext"));
+    const Calls last(calls.steps().end() - 3, calls.steps().end());
+    EXPECT_THAT(last,
+                ElementsAre("git_index_free", "git_annotated_commit_free", "git_repository_free"));
+    ASSERT_THAT(checkouts_, SizeIs(1));
+    expectCheckoutRecord(checkouts_[0], 18);
+    EXPECT_THAT(checkoutPaths_[0], IsEmpty());
+    expectUnchanged(merges_.at(0));
 }
 
 TEST_F(CallsOfAMerge, OfACleanMergeFailItWhenTheyFail)
 {
     makeDiverged();
     const NothingChanges nothing(repository_);
-    expectEachFailsTheMerge(
-        {"repository_open_ext", "revparse_single", "annotated_commit_lookup", "merge"});
+    expectEachFailsTheMerge({"git_repository_open_ext", "git_revparse_single",
+                             "git_annotated_commit_lookup", "git_merge"});
 }
 
 TEST_F(CallsOfAMerge, OfTheIndexFailTheMergeThatStandsByThen)
 {
     makeDiverged();
     const std::string head = idOf("HEAD");
-    expectEachFailsTheMerge({"repository_index"});
+    expectEachFailsTheMerge({"git_repository_index"});
     EXPECT_EQ(idOf("HEAD"), head);
     EXPECT_EQ(idOf("MERGE_HEAD"), idOf("topic"));
     EXPECT_EQ(branches().getRepositoryState(), "Conflicts");
@@ -184,31 +212,35 @@ TEST_F(CallsOfAMerge, OfTheIndexFailTheMergeThatStandsByThen)
 TEST_F(CallsOfAMerge, OfConflictsAreTheseInOrder)
 {
     makeConflicts();
-    BranchCalls calls;
+    LibGit2Recorder calls;
+    calls.on<git_attr_get>([](const char **, git_repository *, std::uint32_t flags, const char *,
+                              const char *) { EXPECT_EQ(flags, 0U); });
     expectConflicts("topic");
-    const auto begin = std::find(calls.names.begin(), calls.names.end(), "index_has_conflicts");
-    const auto end = std::find(begin, calls.names.end(), "repository_free");
-    EXPECT_EQ(std::count(begin, end, "attr_get"), 12) << "two attributes of three stages twice";
+    const auto begin =
+        std::find(calls.steps().begin(), calls.steps().end(), "git_index_has_conflicts");
+    const auto end = std::find(begin, calls.steps().end(), "git_repository_free");
+    EXPECT_EQ(std::count(begin, end, "git_attr_get"), 12) << "two attributes of three stages twice";
     Calls others;
     std::copy_if(begin, end, std::back_inserter(others),
-                 [](const std::string &name) { return name.rfind("attr_", 0) != 0; });
-    EXPECT_THAT(others, ElementsAre("index_has_conflicts", "index_conflict_iterator_new",
-                                    "index_conflict_next", "index_conflict_next",
-                                    "index_conflict_next", "index_conflict_iterator_free",
-                                    "checkout_index", "index_free", "annotated_commit_free"));
-    EXPECT_THAT(calls.attributeFlags, testing::Each(0U));
+                 [](const std::string &name) { return name.rfind("git_attr_", 0) != 0; });
+    EXPECT_THAT(others,
+                ElementsAre("git_index_has_conflicts", "git_index_conflict_iterator_new",
+                            "git_index_conflict_next", "git_index_conflict_next",
+                            "git_index_conflict_next", "git_index_conflict_iterator_free",
+                            "git_checkout_index", "git_index_free", "git_annotated_commit_free"));
 }
 
 TEST_F(CallsOfAMerge, OfTheSecondCheckoutTakeTheFirstOnesRecordAndOurs)
 {
     makeConflicts();
-    BranchCalls calls;
+    LibGit2Recorder calls;
+    collectRecords(calls);
     expectConflicts("topic");
-    ASSERT_THAT(calls.checkouts, SizeIs(2));
-    expectCheckoutRecord(calls.checkouts[0], 18);
-    expectCheckoutRecord(calls.checkouts[1], 18 | 2048);
-    EXPECT_THAT(calls.checkoutPaths[0], IsEmpty());
-    EXPECT_THAT(calls.checkoutPaths[1], ElementsAre("binary", "binary", "binary"))
+    ASSERT_THAT(checkouts_, SizeIs(2));
+    expectCheckoutRecord(checkouts_[0], 18);
+    expectCheckoutRecord(checkouts_[1], 18 | 2048);
+    EXPECT_THAT(checkoutPaths_[0], IsEmpty());
+    EXPECT_THAT(checkoutPaths_[1], ElementsAre("binary", "binary", "binary"))
         << "once for each stage";
 }
 
@@ -216,7 +248,7 @@ TEST_F(CallsOfAMerge, OfTheSecondCheckoutAreToldInPlaceOfTheConflicts)
 {
     makeConflicts();
     const std::string head = idOf("HEAD");
-    expectEachFailsTheMerge({"checkout_index"});
+    expectEachFailsTheMerge({"git_checkout_index"});
     EXPECT_EQ(idOf("HEAD"), head);
     EXPECT_EQ(branches().getRepositoryState(), "Conflicts");
     EXPECT_THAT(repository_.read("binary"), testing::HasSubstr("<<<<<<<"));
@@ -225,7 +257,7 @@ TEST_F(CallsOfAMerge, OfTheSecondCheckoutAreToldInPlaceOfTheConflicts)
 TEST_F(CallsOfAMerge, OfTheWalkOverConflictsFailTheMerge)
 {
     makeConflicts();
-    for (const std::string name : {"index_conflict_iterator_new", "index_conflict_next"})
+    for (const std::string name : {"git_index_conflict_iterator_new", "git_index_conflict_next"})
     {
         expectEachFailsTheMerge({name});
         EXPECT_EQ(branches().getRepositoryState(), "Conflicts") << name;
@@ -236,11 +268,12 @@ TEST_F(CallsOfAMerge, OfTheWalkOverConflictsFailTheMerge)
 TEST_F(CallsOfAMerge, OfAttributesMayFailAndCountAsNoAttribute)
 {
     makeConflicts();
-    BranchCalls calls;
-    calls.failing["attr_get"] = GIT_ERROR;
+    LibGit2Recorder calls;
+    collectRecords(calls);
+    calls.fail({{"git_attr_get", GIT_ERROR}});
     const LogCapture log(git::SeverityDiagnostic);
     expectConflicts("topic");
-    EXPECT_THAT(calls.checkouts, SizeIs(1));
+    EXPECT_THAT(checkouts_, SizeIs(1));
     EXPECT_THAT(repository_.read("binary"), testing::HasSubstr("<<<<<<<"));
 }
 

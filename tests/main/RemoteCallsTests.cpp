@@ -6,15 +6,16 @@
 #include <string>
 #include <vector>
 
+#include <git2.h>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "LibGit2Calls.hpp"
 #include "RemoteTest.hpp"
 #include "TestOptionsFactory.hpp"
 #include "error/errorUtil/setGitError.hpp"
 #include "error/logging/severity.hpp"
 #include "support/LogCapture.hpp"
+#include "support/libgit2/LibGit2Recorder.hpp"
 #include "support/text.hpp"
 #include "vclink/git/GitWorkingCopyGenerator.hpp"
 
@@ -97,7 +98,7 @@ class RemoteCalls : public vclink::test::RemoteTest
     const std::string mainId_ = commit("own", "x");
     vclink::git::GitWorkingCopyGenerator generator_{
         std::static_pointer_cast<vclink::ApplicationInteractor>(interactor_)};
-    vclink::test::LibGit2Calls calls_;
+    vclink::test::LibGit2Recorder calls_;
 
   private:
     int clones_ = 0;
@@ -107,10 +108,10 @@ TEST_F(RemoteCalls, OfEachOperationComeInOrder)
 {
     for (const auto &operation : operations())
     {
-        calls_.names.clear();
+        calls_.clear();
         operation.run();
-        EXPECT_EQ(calls_.names, operation.names);
-        EXPECT_THAT(calls_.handles, IsEmpty());
+        EXPECT_EQ(calls_.steps(), operation.names);
+        EXPECT_THAT(calls_.openHandles(), IsEmpty());
     }
 }
 
@@ -123,11 +124,11 @@ TEST_F(RemoteCalls, ThatFailRaiseTheirErrorAndLeaveNoHandle)
         {
             if (name == "git_remote_free" || name == "git_repository_free")
                 continue;
-            calls_.names.clear();
-            calls_.failing = {{name, injected.code}};
+            calls_.clear();
+            calls_.fail({{name, injected.code}});
             EXPECT_EQ(libGit2FailureOf(operation.run), injected) << name;
-            EXPECT_EQ(calls_.names, untilFailure(operation.names, name)) << name;
-            EXPECT_THAT(calls_.handles, IsEmpty()) << name;
+            EXPECT_EQ(calls_.steps(), untilFailure(operation.names, name)) << name;
+            EXPECT_THAT(calls_.openHandles(), IsEmpty()) << name;
         }
     }
 }
@@ -144,14 +145,14 @@ TEST_F(RemoteCalls, AreKeptFromTheSignalOfABrokenConnection)
     {
         operation.run();
         EXPECT_FALSE(isSigpipeBlocked());
-        calls_.failing = {{"git_proxy_options_init", -1}};
+        calls_.fail({{"git_proxy_options_init", -1}});
         libGit2FailureOf(operation.run);
         EXPECT_FALSE(isSigpipeBlocked());
-        calls_.failing.clear();
+        calls_.fail({});
     }
-    // Those of a clone that make its record touch no connection.
+    // Those of a clone that make its record, and the reading of an error, touch no connection.
     for (const auto &name : unguarded)
-        EXPECT_THAT(name, testing::HasSubstr("_init"));
+        EXPECT_THAT(name, testing::AnyOf(testing::HasSubstr("_init"), "git_error_last"));
 }
 
 TEST_F(RemoteCalls, TakeTheNameAndTheRefspecsAsUtf8)
@@ -162,15 +163,18 @@ TEST_F(RemoteCalls, TakeTheNameAndTheRefspecsAsUtf8)
         ASSERT_NE(list, nullptr);
         refspecs.emplace_back(list->strings, list->strings + list->count);
     };
-    calls_.onFetch = [&](const git_strarray *list, const git_fetch_options *, const char *message)
-    {
-        note(list);
-        EXPECT_EQ(message, nullptr);
-    };
-    calls_.onPush = [&](const git_strarray *list, const git_push_options *) { note(list); };
-    calls_.onRemoteLookup = [](const char *name) { EXPECT_STREQ(name, "origin"); };
+    calls_.on<git_remote_fetch>(
+        [&](git_remote *, const git_strarray *list, const git_fetch_options *, const char *message)
+        {
+            note(list);
+            EXPECT_EQ(message, nullptr);
+        });
+    calls_.on<git_remote_push>([&](git_remote *, const git_strarray *list, const git_push_options *)
+                               { note(list); });
+    calls_.on<git_remote_lookup>([](git_remote **, git_repository *, const char *name)
+                                 { EXPECT_STREQ(name, "origin"); });
     const Names two{"refs/heads/gr\xC3\xBC\xC3\x9F:refs/own/\xE6\x9D\xB1", " odd caf\xE9 #\\*"};
-    calls_.failing = {{"git_remote_fetch", -31}, {"git_remote_push", -31}};
+    calls_.fail({{"git_remote_fetch", -31}, {"git_remote_push", -31}});
     libGit2FailureOf([&] { fetch(two); });
     libGit2FailureOf([&] { push(two); });
     libGit2FailureOf([&] { fetch(); });
@@ -180,24 +184,27 @@ TEST_F(RemoteCalls, TakeTheNameAndTheRefspecsAsUtf8)
 TEST_F(RemoteCalls, CarryTheSetsOfTheAdapter)
 {
     void *const set = &adapter_->getCallbacks().remoteCallbacks();
-    calls_.onFetch = [&](const git_strarray *, const git_fetch_options *options, const char *)
-    {
-        EXPECT_EQ(options->callbacks.payload, set);
-        EXPECT_EQ(options->proxy_opts.type, GIT_PROXY_NONE);
-    };
-    calls_.onPush = [&](const git_strarray *, const git_push_options *options)
-    {
-        EXPECT_EQ(options->callbacks.payload, set);
-        EXPECT_EQ(options->pb_parallelism, 1U);
-    };
-    calls_.onConnect = [&](git_direction direction, const git_remote_callbacks *callbacks,
-                           const git_proxy_options *proxy, const git_strarray *headers)
-    {
-        EXPECT_EQ(direction, GIT_DIRECTION_FETCH);
-        EXPECT_EQ(callbacks->payload, set);
-        EXPECT_EQ(proxy->type, GIT_PROXY_NONE);
-        EXPECT_EQ(headers, nullptr);
-    };
+    calls_.on<git_remote_fetch>(
+        [&](git_remote *, const git_strarray *, const git_fetch_options *options, const char *)
+        {
+            EXPECT_EQ(options->callbacks.payload, set);
+            EXPECT_EQ(options->proxy_opts.type, GIT_PROXY_NONE);
+        });
+    calls_.on<git_remote_push>(
+        [&](git_remote *, const git_strarray *, const git_push_options *options)
+        {
+            EXPECT_EQ(options->callbacks.payload, set);
+            EXPECT_EQ(options->pb_parallelism, 1U);
+        });
+    calls_.on<git_remote_connect>(
+        [&](git_remote *, git_direction direction, const git_remote_callbacks *callbacks,
+            const git_proxy_options *proxy, const git_strarray *headers)
+        {
+            EXPECT_EQ(direction, GIT_DIRECTION_FETCH);
+            EXPECT_EQ(callbacks->payload, set);
+            EXPECT_EQ(proxy->type, GIT_PROXY_NONE);
+            EXPECT_EQ(headers, nullptr);
+        });
     for (const auto &operation : operations())
         operation.run();
 }
@@ -205,27 +212,29 @@ TEST_F(RemoteCalls, CarryTheSetsOfTheAdapter)
 TEST_F(RemoteCalls, OfACloneAreGivenTheTextsAndASafeRecord)
 {
     const std::string target = (folder() / "gr\xC3\xBC\xC3\x9F").string();
-    calls_.onClone = [&](const char *url, const char *path, const git_clone_options *options)
-    {
-        EXPECT_EQ(url, nameOf(server_));
-        EXPECT_EQ(path, target);
-        EXPECT_EQ(options->bare, 0);
-        EXPECT_EQ(options->checkout_branch, nullptr);
-        EXPECT_EQ(options->local, GIT_CLONE_LOCAL_AUTO);
-        EXPECT_EQ(options->checkout_opts.checkout_strategy, unsigned{GIT_CHECKOUT_SAFE});
-    };
+    calls_.on<git_clone>(
+        [&](git_repository **, const char *url, const char *path, const git_clone_options *options)
+        {
+            EXPECT_EQ(url, nameOf(server_));
+            EXPECT_EQ(path, target);
+            EXPECT_EQ(options->bare, 0);
+            EXPECT_EQ(options->checkout_branch, nullptr);
+            EXPECT_EQ(options->local, GIT_CLONE_LOCAL_AUTO);
+            EXPECT_EQ(options->checkout_opts.checkout_strategy, unsigned{GIT_CHECKOUT_SAFE});
+        });
     generator_.generate(asUtf16(nameOf(server_)), asPath(target));
 }
 
 /// The error is read before the release, which may replace libgit2's record of it.
 TEST_F(RemoteCalls, OfACloneThatFailsReleaseWhatItLeft)
 {
-    calls_.cloneInstead = [&](git_repository **out)
-    {
-        EXPECT_EQ(git_repository_open(out, repository_.path().c_str()), 0);
-        git_error_set_str(GIT_ERROR_NET, "of the clone");
-        return -9;
-    };
+    calls_.answer<git_clone>(
+        [&](auto, git_repository **out, auto...)
+        {
+            EXPECT_EQ(git_repository_open(out, repository_.path().c_str()), 0);
+            git_error_set_str(GIT_ERROR_NET, "of the clone");
+            return -9;
+        });
     calls_.onCall = [](const std::string &name)
     {
         if (name == "git_repository_free")
@@ -233,7 +242,7 @@ TEST_F(RemoteCalls, OfACloneThatFailsReleaseWhatItLeft)
     };
     EXPECT_EQ(libGit2FailureOf([this] { clone(); }),
               (LibGit2Failure{-9, GIT_ERROR_NET, "of the clone"}));
-    EXPECT_EQ(calls_.names.back(), "git_repository_free");
+    EXPECT_EQ(calls_.steps().back(), "git_repository_free");
 }
 
 TEST_F(RemoteCalls, OfAListingAreCopiedWhole)
@@ -250,12 +259,13 @@ TEST_F(RemoteCalls, OfAListingAreCopiedWhole)
     second.local = -2;
     const git_remote_head third = {};
     const git_remote_head *list[] = {&first, &second, &third};
-    calls_.listInstead = [&](const git_remote_head ***heads, std::size_t *count)
-    {
-        *heads = list;
-        *count = 3;
-        return 0;
-    };
+    calls_.answer<git_remote_ls>(
+        [&](auto, const git_remote_head ***heads, std::size_t *count, git_remote *)
+        {
+            *heads = list;
+            *count = 3;
+            return 0;
+        });
     const auto heads = remote().getRemoteHeads();
     name.assign(name.size(), 'x');
     target.assign(target.size(), 'x');
@@ -274,7 +284,7 @@ TEST_F(RemoteCalls, OfAListingAreCopiedWhole)
 
 TEST_F(RemoteCalls, OfAListingThatFailsTellTheFailure)
 {
-    calls_.failing = {{"git_remote_ls", -31}};
+    calls_.fail({{"git_remote_ls", -31}});
     const vclink::test::LogCapture log(git::SeverityDiagnostic);
     EXPECT_EQ(libGit2FailureOf([this] { remote().getRemoteHeads(); }), injected);
     EXPECT_THAT(log.messages(), ElementsAre("Throwing error injected (-31)"));
@@ -285,41 +295,43 @@ TEST_F(RemoteCalls, AskTheFactoryOfTheAdapterAfterTheLookup)
     class Factory : public vclink::test::TestOptionsFactory
     {
       public:
-        Factory(std::shared_ptr<vclink::ApplicationInteractor> interactor, Names &names)
-            : TestOptionsFactory(std::move(interactor)), names_(names)
+        Factory(std::shared_ptr<vclink::ApplicationInteractor> interactor,
+                vclink::test::LibGit2Recorder &calls)
+            : TestOptionsFactory(std::move(interactor)), calls_(calls)
         {
         }
         git::FetchOptions makeFetchOptions() override
         {
-            names_.emplace_back("makeFetchOptions");
+            calls_.note("makeFetchOptions");
             return {};
         }
         git::PushOptions makePushOptions() override
         {
-            names_.emplace_back("makePushOptions");
+            calls_.note("makePushOptions");
             git::PushOptions options;
             options.packbuilderParallelism = 3;
             return options;
         }
         git::ProxyOptions makeProxyOptions() override
         {
-            names_.emplace_back("makeProxyOptions");
+            calls_.note("makeProxyOptions");
             return {};
         }
 
       private:
-        Names &names_;
+        vclink::test::LibGit2Recorder &calls_;
     };
     git::GitAdapter adapter(asPath(repository_.path()),
-                            std::make_shared<Factory>(interactor_, calls_.names));
+                            std::make_shared<Factory>(interactor_, calls_));
     const auto remote = git::GitRemote::create("origin", adapter);
-    calls_.onPush = [](const git_strarray *, const git_push_options *options)
-    { EXPECT_EQ(options->pb_parallelism, 3U); };
+    calls_.on<git_remote_push>(
+        [](git_remote *, const git_strarray *, const git_push_options *options)
+        { EXPECT_EQ(options->pb_parallelism, 3U); });
     const auto thirdCallOf = [this](const std::function<void()> &operation)
     {
-        calls_.names.clear();
+        calls_.clear();
         operation();
-        return calls_.names.at(2);
+        return calls_.steps().at(2);
     };
     EXPECT_EQ(thirdCallOf([&] { remote->fetch({}); }), "makeFetchOptions");
     EXPECT_EQ(thirdCallOf([&] { remote->push({}); }), "makePushOptions");

@@ -6,12 +6,13 @@
 #include <vector>
 
 #include <fcntl.h>
+#include <git2.h>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "LibGit2Calls.hpp"
 #include "StagingTest.hpp"
 #include "TestOptionsFactory.hpp"
+#include "support/libgit2/LibGit2Recorder.hpp"
 #include "util/pathspecEscape.hpp"
 #include "vclink/util/exception/CancelledOperationException.hpp"
 
@@ -25,7 +26,7 @@ using vclink::git::TagException;
 using vclink::test::asPath;
 using vclink::test::Failure;
 using vclink::test::failureOf;
-using vclink::test::LibGit2Calls;
+using vclink::test::LibGit2Recorder;
 using vclink::test::NothingChanges;
 using Names = std::vector<std::string>;
 
@@ -52,20 +53,23 @@ class RevertCalls : public vclink::test::StagingTest
     RevertCalls()
     {
         repository_.write("file", "edited");
-        calls_.names.clear();
-        factory_->onCheckoutOptions = [this] { calls_.names.emplace_back("makeCheckoutOptions"); };
-        calls_.onRevparse = [this](const char *text) { revisions_.emplace_back(text); };
-        calls_.onReset = [this](const git_object *target, const git_strarray *pathspec)
-        {
-            targets_.push_back(target == nullptr ? "none" : idOf(target));
-            resetFiles_.push_back(textsOf(*pathspec));
-        };
-        calls_.onCheckout = [this](git_index *index, const git_checkout_options *options)
-        {
-            EXPECT_EQ(index, nullptr);
-            records_.push_back(*options);
-            checkoutFiles_.push_back(textsOf(options->paths));
-        };
+        calls_.clear();
+        factory_->onCheckoutOptions = [this] { calls_.note("makeCheckoutOptions"); };
+        calls_.on<git_revparse_single>([this](git_object **, git_repository *, const char *text)
+                                       { revisions_.emplace_back(text); });
+        calls_.on<git_reset_default>(
+            [this](git_repository *, const git_object *target, const git_strarray *pathspec)
+            {
+                targets_.push_back(target == nullptr ? "none" : idOf(target));
+                resetFiles_.push_back(textsOf(*pathspec));
+            });
+        calls_.on<git_checkout_index>(
+            [this](git_repository *, git_index *index, const git_checkout_options *options)
+            {
+                EXPECT_EQ(index, nullptr);
+                records_.push_back(*options);
+                checkoutFiles_.push_back(textsOf(options->paths));
+            });
     }
 
     static std::string idOf(const git_object *object)
@@ -84,7 +88,7 @@ class RevertCalls : public vclink::test::StagingTest
     std::shared_ptr<vclink::test::TestOptionsFactory> factory_ =
         std::make_shared<vclink::test::TestOptionsFactory>(interactor_);
     vclink::git::GitAdapter adapter_{asPath(repository_.path()), factory_};
-    LibGit2Calls calls_;
+    LibGit2Recorder calls_;
     Names revisions_;
     Names targets_;
     std::vector<Names> resetFiles_;
@@ -95,14 +99,14 @@ class RevertCalls : public vclink::test::StagingTest
 TEST_F(RevertCalls, ResetTheIndexAndCheckItOut)
 {
     revert({"file"});
-    EXPECT_EQ(calls_.names, reset + makingOptions + checkout + released);
-    EXPECT_THAT(calls_.handles, IsEmpty());
+    EXPECT_EQ(calls_.steps(), reset + makingOptions + checkout + released);
+    EXPECT_THAT(calls_.openHandles(), IsEmpty());
 }
 
 TEST_F(RevertCalls, AreTheSameWithoutAChange)
 {
     revert({"other"});
-    EXPECT_EQ(calls_.names, reset + makingOptions + checkout + released);
+    EXPECT_EQ(calls_.steps(), reset + makingOptions + checkout + released);
 }
 
 TEST_F(RevertCalls, ResetOnceWhereFilesWereOnlyAdded)
@@ -133,7 +137,7 @@ TEST_F(RevertCalls, ResetASecondTimeWhereAFileIsLostOnTheWay)
     revert({"file"});
     EXPECT_THAT(targets_, testing::SizeIs(2));
     EXPECT_THAT(resetFiles_, ElementsAre(ElementsAre("file"), ElementsAre("file")));
-    EXPECT_THAT(calls_.handles, IsEmpty());
+    EXPECT_THAT(calls_.openHandles(), IsEmpty());
 }
 
 TEST_F(RevertCalls, ResetToTheCommitOfHead)
@@ -149,12 +153,12 @@ TEST_F(RevertCalls, ResetToNothingWithoutAHead)
     revert({"file"});
     EXPECT_THAT(targets_, ElementsAre("none"));
     EXPECT_THAT(checkoutFiles_, ElementsAre(ElementsAre("file")));
-    EXPECT_THAT(calls_.handles, IsEmpty());
+    EXPECT_THAT(calls_.openHandles(), IsEmpty());
 }
 
 TEST_F(RevertCalls, ResetToNothingWhyeverHeadFails)
 {
-    calls_.failing = {{"git_revparse_single", GIT_EAUTH}};
+    calls_.fail({{"git_revparse_single", GIT_EAUTH}});
     EXPECT_NO_THROW(revert({"file"}));
     EXPECT_THAT(targets_, ElementsAre("none"));
     EXPECT_EQ(vclink::test::indexOf(repository_).count("file"), 0U);
@@ -243,18 +247,19 @@ TEST_F(RevertCalls, PassAnExceptionOfTheFactoryOn)
     factory_->onCheckoutOptions = [] { throw std::logic_error("the factory"); };
     EXPECT_THROW(revert({"file"}), std::logic_error);
     EXPECT_THAT(records_, IsEmpty());
-    EXPECT_THAT(calls_.handles, IsEmpty());
+    EXPECT_THAT(calls_.openHandles(), IsEmpty());
 }
 
 TEST_F(RevertCalls, OpenTheRootItselfWithoutASearch)
 {
     Names paths;
-    calls_.onOpen = [&](const char *path, unsigned flags, const char *ceilings)
-    {
-        paths.emplace_back(path);
-        EXPECT_EQ(flags, static_cast<unsigned>(GIT_REPOSITORY_OPEN_NO_SEARCH));
-        EXPECT_EQ(ceilings, nullptr);
-    };
+    calls_.on<git_repository_open_ext>(
+        [&](git_repository **, const char *path, unsigned flags, const char *ceilings)
+        {
+            paths.emplace_back(path);
+            EXPECT_EQ(flags, static_cast<unsigned>(GIT_REPOSITORY_OPEN_NO_SEARCH));
+            EXPECT_EQ(ceilings, nullptr);
+        });
     revert({"file"});
     EXPECT_THAT(paths, ElementsAre(repository_.path().string(), repository_.path().string()));
 }
@@ -262,16 +267,16 @@ TEST_F(RevertCalls, OpenTheRootItselfWithoutASearch)
 TEST_F(RevertCalls, AreNoneForAnEmptyList)
 {
     revert({});
-    EXPECT_THAT(calls_.names, IsEmpty());
+    EXPECT_THAT(calls_.steps(), IsEmpty());
 }
 
 TEST_F(RevertCalls, AreThoseOfTheQueryAloneWhereAFileIsInConflict)
 {
     beginMerge({"conflicted"});
-    calls_.names.clear();
+    calls_.clear();
     EXPECT_THROW(revert({"file", "conflicted"}), TagException<Conflicted>);
-    EXPECT_EQ(calls_.names, ofTheQuery);
-    EXPECT_THAT(calls_.handles, IsEmpty());
+    EXPECT_EQ(calls_.steps(), ofTheQuery);
+    EXPECT_THAT(calls_.openHandles(), IsEmpty());
 }
 
 /// A call that fails, and what follows it.
@@ -281,12 +286,12 @@ class FailingRevertCalls : public RevertCalls
     void expectFails(const std::string &name, const Names &expected)
     {
         SCOPED_TRACE(name);
-        calls_.names.clear();
-        calls_.failing = {{name, GIT_EAUTH}};
+        calls_.clear();
+        calls_.fail({{name, GIT_EAUTH}});
         EXPECT_EQ(failureOf([this] { revert({"file"}); }),
                   (Failure{GIT_EAUTH, GIT_ERROR_OS, "injected"}));
-        EXPECT_EQ(calls_.names, expected);
-        EXPECT_THAT(calls_.handles, IsEmpty());
+        EXPECT_EQ(calls_.steps(), expected);
+        EXPECT_THAT(calls_.openHandles(), IsEmpty());
     }
 };
 

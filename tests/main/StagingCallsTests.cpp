@@ -3,11 +3,12 @@
 #include <string>
 #include <vector>
 
+#include <git2.h>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "LibGit2Calls.hpp"
 #include "StagingTest.hpp"
+#include "support/libgit2/LibGit2Recorder.hpp"
 #include "util/pathspecEscape.hpp"
 
 namespace
@@ -20,7 +21,7 @@ using testing::IsEmpty;
 using vclink::git::TagException;
 using vclink::test::Failure;
 using vclink::test::failureOf;
-using vclink::test::LibGit2Calls;
+using vclink::test::LibGit2Recorder;
 using vclink::test::NothingChanges;
 using Names = std::vector<std::string>;
 
@@ -53,15 +54,17 @@ class StagingCalls : public vclink::test::StagingTest
     StagingCalls()
     {
         repository_.write("new", "x");
-        calls_.names.clear();
-        calls_.onAddAll = [this](const git_strarray *pathspec, unsigned flags,
-                                 git_index_matched_path_cb callback, void *payload) {
-            additions_.push_back({textsOf(pathspec), flags, callback, payload});
-        };
-        calls_.onRemoveAll = [this](const git_strarray *pathspec,
-                                    git_index_matched_path_cb callback, void *payload) {
-            removals_.push_back({textsOf(pathspec), 99, callback, payload});
-        };
+        calls_.clear();
+        calls_.on<git_index_add_all>(
+            [this](git_index *, const git_strarray *pathspec, unsigned flags,
+                   git_index_matched_path_cb callback, void *payload) {
+                additions_.push_back({textsOf(pathspec), flags, callback, payload});
+            });
+        calls_.on<git_index_remove_all>(
+            [this](git_index *, const git_strarray *pathspec, git_index_matched_path_cb callback,
+                   void *payload) {
+                removals_.push_back({textsOf(pathspec), 99, callback, payload});
+            });
     }
 
     static Names textsOf(const git_strarray *pathspec)
@@ -82,7 +85,7 @@ class StagingCalls : public vclink::test::StagingTest
     }
 
     std::unique_ptr<vclink::git::GitAdapter> adapter_ = makeAdapter(repository_.path());
-    LibGit2Calls calls_;
+    LibGit2Recorder calls_;
     std::vector<Asked> additions_;
     std::vector<Asked> removals_;
 };
@@ -90,36 +93,37 @@ class StagingCalls : public vclink::test::StagingTest
 TEST_F(StagingCalls, OfAnAdditionFollowThoseOfTheQuery)
 {
     add({"new"});
-    EXPECT_EQ(calls_.names, ofTheQuery + ofTheAddition);
-    EXPECT_THAT(calls_.handles, IsEmpty());
+    EXPECT_EQ(calls_.steps(), ofTheQuery + ofTheAddition);
+    EXPECT_THAT(calls_.openHandles(), IsEmpty());
 }
 
 TEST_F(StagingCalls, OfARemovalFollowThoseOfTheQuery)
 {
     remove({"file"});
-    EXPECT_EQ(calls_.names, ofTheQuery + ofTheRemoval);
-    EXPECT_THAT(calls_.handles, IsEmpty());
+    EXPECT_EQ(calls_.steps(), ofTheQuery + ofTheRemoval);
+    EXPECT_THAT(calls_.openHandles(), IsEmpty());
 }
 
 TEST_F(StagingCalls, OfAFileMarkedAsResolvedAreThoseOfItsAdditionOrRemoval)
 {
     markResolved("new");
-    EXPECT_EQ(calls_.names, ofTheAddition);
-    calls_.names.clear();
+    EXPECT_EQ(calls_.steps(), ofTheAddition);
+    calls_.clear();
     markResolved("missing");
-    EXPECT_EQ(calls_.names, ofTheRemoval);
-    EXPECT_THAT(calls_.handles, IsEmpty());
+    EXPECT_EQ(calls_.steps(), ofTheRemoval);
+    EXPECT_THAT(calls_.openHandles(), IsEmpty());
 }
 
 TEST_F(StagingCalls, OpenTheRootItselfWithoutASearch)
 {
     Names paths;
-    calls_.onOpen = [&](const char *path, unsigned flags, const char *ceilings)
-    {
-        paths.emplace_back(path);
-        EXPECT_EQ(flags, static_cast<unsigned>(GIT_REPOSITORY_OPEN_NO_SEARCH));
-        EXPECT_EQ(ceilings, nullptr);
-    };
+    calls_.on<git_repository_open_ext>(
+        [&](git_repository **, const char *path, unsigned flags, const char *ceilings)
+        {
+            paths.emplace_back(path);
+            EXPECT_EQ(flags, static_cast<unsigned>(GIT_REPOSITORY_OPEN_NO_SEARCH));
+            EXPECT_EQ(ceilings, nullptr);
+        });
     add({"new"});
     markResolved("missing");
     const std::string root = repository_.path();
@@ -178,23 +182,23 @@ TEST_F(StagingCalls, AreNoneForAnEmptyList)
 {
     adapter_->addFiles({});
     EXPECT_THROW(adapter_->removeFiles({}), TagException<NoFilesToRemove>);
-    EXPECT_THAT(calls_.names, IsEmpty());
+    EXPECT_THAT(calls_.steps(), IsEmpty());
 }
 
 TEST_F(StagingCalls, AreThoseOfTheQueryAloneWhereNothingIsLeftToDo)
 {
     add({"missing"});
-    EXPECT_EQ(calls_.names, ofTheQuery);
-    calls_.names.clear();
+    EXPECT_EQ(calls_.steps(), ofTheQuery);
+    calls_.clear();
     EXPECT_THROW(remove({"missing"}), TagException<NoFilesToRemove>);
-    EXPECT_EQ(calls_.names, ofTheQuery);
+    EXPECT_EQ(calls_.steps(), ofTheQuery);
 }
 
 TEST_F(StagingCalls, AreThoseOfTheQueryAloneWhereAFileIsRefused)
 {
     EXPECT_THROW(add({"new", "file"}), TagException<AlreadyAdded>);
-    EXPECT_EQ(calls_.names, ofTheQuery);
-    EXPECT_THAT(calls_.handles, IsEmpty());
+    EXPECT_EQ(calls_.steps(), ofTheQuery);
+    EXPECT_THAT(calls_.openHandles(), IsEmpty());
 }
 
 /// One of the calls of staging that fail, and those that are made nevertheless.
@@ -202,6 +206,8 @@ struct FailingCall
 {
     std::string name;
     Names expected;
+    /// which of the calls by this name; 0 for each
+    std::size_t call = 0;
 };
 
 class FailingStagingCalls : public StagingCalls
@@ -210,12 +216,12 @@ class FailingStagingCalls : public StagingCalls
     void expectFails(const FailingCall &failing, const std::function<void()> &operation)
     {
         SCOPED_TRACE(failing.name);
-        calls_.names.clear();
-        calls_.failing = {{failing.name, GIT_EAUTH}};
+        calls_.clear();
+        calls_.fail({{failing.name, GIT_EAUTH, failing.call}});
         const NothingChanges nothing(repository_);
         EXPECT_EQ(failureOf(operation), (Failure{GIT_EAUTH, GIT_ERROR_OS, "injected"}));
-        EXPECT_EQ(calls_.names, failing.expected);
-        EXPECT_THAT(calls_.handles, IsEmpty());
+        EXPECT_EQ(calls_.steps(), failing.expected);
+        EXPECT_THAT(calls_.openHandles(), IsEmpty());
     }
 };
 
@@ -261,14 +267,10 @@ TEST_F(FailingStagingCalls, EndARemovalAndReleaseTheHandles)
 
 TEST_F(FailingStagingCalls, OfTheSecondOpeningEndAnOperation)
 {
-    calls_.onOpen = [this, count = 0](const char *, unsigned, const char *) mutable
-    {
-        if (++count % 2 == 0)
-            calls_.failing = {{"git_repository_open_ext", GIT_EAUTH}};
-    };
-    const FailingCall none{"", ofTheQuery + Names{"git_repository_open_ext"}};
-    expectFails(none, [this] { add({"new"}); });
-    expectFails(none, [this] { remove({"file"}); });
+    const FailingCall second{"git_repository_open_ext",
+                             ofTheQuery + Names{"git_repository_open_ext"}, 2};
+    expectFails(second, [this] { add({"new"}); });
+    expectFails(second, [this] { remove({"file"}); });
 }
 
 TEST_F(FailingStagingCalls, OfTheQueryEndAnOperationToo)

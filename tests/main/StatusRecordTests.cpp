@@ -3,11 +3,12 @@
 #include <string>
 #include <vector>
 
+#include <git2.h>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include "AdapterTest.hpp"
-#include "LibGit2Calls.hpp"
+#include "support/libgit2/LibGit2Recorder.hpp"
 #include "support/text.hpp"
 
 namespace
@@ -15,7 +16,7 @@ namespace
 
 using testing::ElementsAre;
 using vclink::test::asPath;
-using vclink::test::LibGit2Calls;
+using vclink::test::LibGit2Recorder;
 
 /// What a walk was asked for.
 struct Asked
@@ -33,23 +34,23 @@ class StatusRecord : public vclink::test::AdapterTest
   protected:
     StatusRecord()
     {
-        calls_.onStatusForeach = [this](LibGit2Calls::Walk, git_repository *repository,
-                                        const git_status_options *options, git_status_cb callback,
-                                        void *payload)
-        {
-            const git_strarray &pathspec = options->pathspec;
-            walks_.push_back({*options,
-                              {pathspec.strings, pathspec.strings + pathspec.count},
-                              git_repository_workdir(repository),
-                              callback != nullptr,
-                              payload != nullptr});
-            return 0;
-        };
+        calls_.answer<git_status_foreach_ext>(
+            [this](auto, git_repository *repository, const git_status_options *options,
+                   git_status_cb callback, void *payload)
+            {
+                const git_strarray &pathspec = options->pathspec;
+                walks_.push_back({*options,
+                                  {pathspec.strings, pathspec.strings + pathspec.count},
+                                  git_repository_workdir(repository),
+                                  callback != nullptr,
+                                  payload != nullptr});
+                return 0;
+            });
         adapter_ = makeAdapter(repository_.path());
     }
 
     vclink::test::GitRepository repository_ = makeRepository();
-    LibGit2Calls calls_;
+    LibGit2Recorder calls_;
     std::vector<Asked> walks_;
     std::unique_ptr<vclink::git::GitAdapter> adapter_;
 };
@@ -106,9 +107,9 @@ TEST_F(StatusRecord, HasOnePatternForAFolder)
 
 TEST_F(StatusRecord, IsNotMadeForAnEmptyList)
 {
-    calls_.names.clear();
+    calls_.clear();
     EXPECT_TRUE(adapter_->getFileStates({}).empty());
-    EXPECT_THAT(calls_.names, ElementsAre());
+    EXPECT_THAT(calls_.steps(), ElementsAre());
 }
 
 } // namespace

@@ -6,11 +6,11 @@
 #include <string>
 #include <vector>
 
+#include <git2.h>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include "AdapterTest.hpp"
-#include "LibGit2Calls.hpp"
 #include "TestOptionsFactory.hpp"
 #include "error/errorUtil/GitErrorPolicy.hpp"
 #include "error/errorUtil/GitResult.hpp"
@@ -18,6 +18,7 @@
 #include "error/errorUtil/setGitError.hpp"
 #include "options/Callbacks.hpp"
 #include "support/LogCapture.hpp"
+#include "support/libgit2/LibGit2Recorder.hpp"
 #include "support/text.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
 
@@ -30,7 +31,7 @@ using testing::HasSubstr;
 using vclink::git::LibGit2Exception;
 using vclink::git::pendingCallbackException;
 using vclink::test::asPath;
-using vclink::test::LibGit2Calls;
+using vclink::test::LibGit2Recorder;
 using vclink::test::LogCapture;
 using vclink::test::States;
 
@@ -60,7 +61,7 @@ class StatusWalk : public vclink::test::AdapterTest
         for (const auto *name : {"a", "b", "c", "d"})
             repository_.write(name, name);
         adapter_ = makeAdapter(repository_.path());
-        calls_.names.clear();
+        calls_.clear();
     }
     ~StatusWalk() override
     {
@@ -78,22 +79,22 @@ class StatusWalk : public vclink::test::AdapterTest
     {
         throwing_.left = count;
         throwing_.raise = std::move(raise);
-        calls_.onStatusForeach = [this](LibGit2Calls::Walk real, git_repository *repository,
-                                        const git_status_options *options, git_status_cb callback,
-                                        void *payload)
-        {
-            throwing_.callback = callback;
-            throwing_.payload = payload;
-            code_ = real(repository, options,
-                         vclink::git::makeCallback<&ThrowingCallback::status, git_status_cb>(),
-                         &throwing_);
-            return code_;
-        };
+        calls_.answer<git_status_foreach_ext>(
+            [this](auto real, git_repository *repository, const git_status_options *options,
+                   git_status_cb callback, void *payload)
+            {
+                throwing_.callback = callback;
+                throwing_.payload = payload;
+                code_ = real(repository, options,
+                             vclink::git::makeCallback<&ThrowingCallback::status, git_status_cb>(),
+                             &throwing_);
+                return code_;
+            });
     }
 
     vclink::test::GitRepository repository_ = makeRepository();
     std::unique_ptr<vclink::git::GitAdapter> adapter_;
-    LibGit2Calls calls_;
+    LibGit2Recorder calls_;
     ThrowingCallback throwing_;
     int code_ = 0;
 };
@@ -105,33 +106,35 @@ const States fourStates{
 TEST_F(StatusWalk, OpensAfterTheOptionsAndReleasesAtTheEnd)
 {
     EXPECT_EQ(query(), fourStates);
-    EXPECT_THAT(calls_.names, ElementsAre("git_status_options_init", "git_repository_open_ext",
-                                          "git_status_foreach_ext", "git_repository_free"));
+    EXPECT_THAT(calls_.steps(), ElementsAre("git_status_options_init", "git_repository_open_ext",
+                                            "git_status_foreach_ext", "git_repository_free"));
 }
 
 TEST_F(StatusWalk, AsksForTheOptionsFirst)
 {
     const auto factory = std::make_shared<vclink::test::TestOptionsFactory>(interactor_);
-    factory->onStatusOptions = [this] { calls_.names.emplace_back("makeStatusOptions"); };
+    factory->onStatusOptions = [this] { calls_.note("makeStatusOptions"); };
     vclink::git::GitAdapter adapter(asPath(folder() / "missing"), factory);
-    calls_.names.clear();
+    calls_.clear();
     EXPECT_THROW(adapter.getFolderStates(adapter.getRootFolder()), LibGit2Exception);
-    ASSERT_GE(calls_.names.size(), 3U);
-    calls_.names.resize(3);
-    EXPECT_THAT(calls_.names, ElementsAre("makeStatusOptions", "git_status_options_init",
-                                          "git_repository_open_ext"));
+    auto first = calls_.steps();
+    ASSERT_GE(first.size(), 3U);
+    first.resize(3);
+    EXPECT_THAT(first, ElementsAre("makeStatusOptions", "git_status_options_init",
+                                   "git_repository_open_ext"));
 }
 
 TEST_F(StatusWalk, OpensTheRootItselfWithoutASearch)
 {
     std::vector<std::string> paths;
-    calls_.onOpen = [&](const char *path, unsigned flags, const char *ceilings)
-    {
-        paths.emplace_back(path);
-        EXPECT_EQ(flags, 1U);
-        EXPECT_EQ(flags, static_cast<unsigned>(GIT_REPOSITORY_OPEN_NO_SEARCH));
-        EXPECT_EQ(ceilings, nullptr);
-    };
+    calls_.on<git_repository_open_ext>(
+        [&](git_repository **, const char *path, unsigned flags, const char *ceilings)
+        {
+            paths.emplace_back(path);
+            EXPECT_EQ(flags, 1U);
+            EXPECT_EQ(flags, static_cast<unsigned>(GIT_REPOSITORY_OPEN_NO_SEARCH));
+            EXPECT_EQ(ceilings, nullptr);
+        });
     query();
     adapter_->getRepository();
     EXPECT_THAT(paths, ElementsAre(repository_.path().string(), repository_.path().string()));
@@ -139,11 +142,12 @@ TEST_F(StatusWalk, OpensTheRootItselfWithoutASearch)
 
 TEST_F(StatusWalk, RaisesWhenTheOptionsCannotBeInitialised)
 {
-    calls_.onStatusOptionsInit = []
-    {
-        git_error_set_str(GIT_ERROR_INVALID, "invalid version 1 on git_status_options");
-        return -1;
-    };
+    calls_.answer<git_status_options_init>(
+        [](auto...)
+        {
+            git_error_set_str(GIT_ERROR_INVALID, "invalid version 1 on git_status_options");
+            return -1;
+        });
     try
     {
         query();
@@ -154,29 +158,28 @@ TEST_F(StatusWalk, RaisesWhenTheOptionsCannotBeInitialised)
         EXPECT_EQ(exception.getError().getCode(), -1);
         EXPECT_EQ(exception.getError().getMessage(), u"invalid version 1 on git_status_options");
     }
-    EXPECT_THAT(calls_.names, ElementsAre("git_status_options_init"));
+    EXPECT_THAT(calls_.steps(), ElementsAre("git_status_options_init"));
 }
 
 TEST_F(StatusWalk, GivesTheStatesUpToAFailureOfLibGit2)
 {
     for (const int code : {-1, -3, -7, -31, 1})
     {
-        calls_.onStatusForeach = [code](LibGit2Calls::Walk, git_repository *,
-                                        const git_status_options *, git_status_cb callback,
-                                        void *payload)
-        {
-            callback("a", GIT_STATUS_WT_NEW, payload);
-            callback("b", GIT_STATUS_WT_NEW, payload);
-            return code;
-        };
+        calls_.answer<git_status_foreach_ext>(
+            [code](auto, git_repository *, const git_status_options *, git_status_cb callback,
+                   void *payload)
+            {
+                callback("a", GIT_STATUS_WT_NEW, payload);
+                callback("b", GIT_STATUS_WT_NEW, payload);
+                return code;
+            });
         EXPECT_EQ(query(), twoStates) << code;
     }
 }
 
 TEST_F(StatusWalk, NeitherLogsNorRaisesAFailure)
 {
-    calls_.onStatusForeach = [](LibGit2Calls::Walk, git_repository *, const git_status_options *,
-                                git_status_cb, void *) { return GIT_ERROR; };
+    calls_.answer<git_status_foreach_ext>([](auto...) { return GIT_ERROR; });
     const LogCapture log(0x08 | 0x10);
     EXPECT_EQ(query(), States());
     EXPECT_THAT(log.messages(), ElementsAre());
@@ -184,10 +187,9 @@ TEST_F(StatusWalk, NeitherLogsNorRaisesAFailure)
 
 TEST_F(StatusWalk, ReleasesTheRepositoryAfterAFailure)
 {
-    calls_.onStatusForeach = [](LibGit2Calls::Walk, git_repository *, const git_status_options *,
-                                git_status_cb, void *) { return GIT_ERROR; };
+    calls_.answer<git_status_foreach_ext>([](auto...) { return GIT_ERROR; });
     query();
-    EXPECT_EQ(calls_.names.back(), "git_repository_free");
+    EXPECT_EQ(calls_.steps().back(), "git_repository_free");
 }
 
 TEST_F(StatusWalk, GivesTheStatesUpToAnExceptionInTheCallback)
@@ -234,7 +236,7 @@ TEST_F(StatusWalk, WorksAgainAfterAnException)
 {
     raiseAfter(1, [] { throw std::runtime_error("in the callback"); });
     query();
-    calls_.onStatusForeach = nullptr;
+    calls_.answer<git_status_foreach_ext>(nullptr);
     EXPECT_EQ(query(), fourStates);
     EXPECT_NE(pendingCallbackException(), nullptr);
 }
