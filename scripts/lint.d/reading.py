@@ -14,7 +14,7 @@ import time
 # unit by itself. All others say the same of units that are read together.
 OF_THE_UNIT = ("misc-unused-alias-decls", "misc-unused-using-decls")
 ALONE, TOGETHER = "alone", "together"
-MOST_TOGETHER = 12
+MOST_TOGETHER = 20
 SECONDS = 900
 KEPT_DAYS = 30
 REMARK = re.compile(r"^(/.*?):\d+:\d+: (?:warning|error|fatal error): .*?(\[[^\]]*\])?$")
@@ -113,7 +113,6 @@ class Reader:
             self._found_clean(unit, ALONE, TOGETHER)
         else:
             self._tell(output)
-        return output is None
 
     def read_alone(self, unit):
         """What only a unit of its own shows: that it compiles, and what of it is unused."""
@@ -143,14 +142,16 @@ class Reader:
             return
         files = {os.path.normpath(file) for file, _ in remarks}
         suspects = [unit for unit in units if unit.source in files]
+        others = [unit for unit in units if unit.source not in files]
         headers = files - {unit.source for unit in suspects} - {source}
-        for header in sorted(headers):
-            including = [unit for unit in units if header in unit.inputs]
-            suspects += [u for u in including or units if u not in suspects][:1]
-        confirmed = [unit for unit in suspects if not self.read_whole(unit)]
-        for unit in units:
-            if unit not in suspects and not (confirmed and headers):
+        for unit in suspects:
+            self.read_whole(unit)
+        for unit in others:
+            # What is said of a header may be due to any unit that includes it.
+            if not headers:
                 self._found_clean(unit, TOGETHER)
+            elif not headers <= self.files_told():
+                self.read_whole(unit)
 
     def _join(self, units):
         own = self.project.own_configurations(units[0])
@@ -201,16 +202,22 @@ class Reader:
             return None
         return result.stdout or result.stderr or f"clang-tidy ended with {result.returncode}\n"
 
+    def files_told(self):
+        """The files with remarks that have been printed."""
+        with self.lock:
+            return {os.path.normpath(REMARK.match(line)[1]) for line in self.said}
+
     def _tell(self, output):
         """Prints remarks, each header's once."""
         with self.lock:
             self.failed = True
-            told = False
-            for line in output.splitlines():
+            lines = output.splitlines()
+            told = not any(map(REMARK.match, lines))
+            for line in lines:
                 if REMARK.match(line):
                     told = line not in self.said
                     self.said.add(line)
-                if told or not self.said:
+                if told:
                     print(line, flush=True)
 
 

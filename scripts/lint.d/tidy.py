@@ -5,6 +5,7 @@
 import argparse
 import collections
 import concurrent.futures
+import math
 import os
 import pathlib
 import re
@@ -84,9 +85,9 @@ class Selection:
         self.changed, self.affected = [], []
         paths = {project.path(name) for name in changed}
         for unit in project.units:
-            if is_all or unit.source in paths:
+            if not project.is_made(unit) and (is_all or unit.source in paths):
                 self.changed.append(unit)
-            elif not unit.scanned or not paths.isdisjoint(unit.inputs):
+            elif is_all or not unit.scanned or not paths.isdisjoint(unit.inputs):
                 self.affected.append(unit)
 
 
@@ -145,10 +146,12 @@ def plan(project, reader, selection, jobs):
         if reading.ALONE in wanted:
             alone.append(unit)
     total = sum(map(len, together.values()))
-    limit = max(3, min(reading.MOST_TOGETHER, -(-total // jobs)))
+    limit = max(3, min(reading.MOST_TOGETHER, math.ceil(total / jobs)))
     groups = []
     for of_kind in together.values():
-        count = -(-len(of_kind) // limit)
+        # A unit that consists of a header adds little to what the others include.
+        size = sum(0.25 if project.is_made(unit) else 1 for unit in of_kind)
+        count = math.ceil(size / limit)
         groups += [of_kind[number::count] for number in range(count)]
     groups.sort(key=len, reverse=True)
     # Who is alone in a group is read as a whole, once.

@@ -10,8 +10,11 @@ import shlex
 import subprocess
 
 CONFIGURATION = ".clang-tidy"
-# Flags of code generation differ between targets and change nothing for a reader.
-GENERATION = re.compile(r"-(f(PIC|PIE|cf-|stack-|visibility|sanitize|no-sanitize|no-omit)|g\d?$)")
+# Flags of code generation and linking differ between targets and change nothing for a reader.
+GENERATION = re.compile(
+    r"-(f(PIC|PIE|cf-|stack-|visibility|sanitize|no-sanitize|no-omit)|g\d?$"
+    r"|[DU]_FORTIFY_SOURCE|DBOOST_\w*LINK$|DBOOST_ALL_NO_LIB$)"
+)
 ERROR = re.compile(
     r"^(?:Error while scanning dependencies for (.*):|.*fatal error: '(.*)' file not found)$",
     re.MULTILINE,
@@ -59,6 +62,10 @@ class Project:
         """A path as git spells it; None outside the working tree."""
         name = os.path.relpath(path, self.root)
         return None if name.startswith("..") else name
+
+    def is_made(self, unit):
+        """Whether the unit is not a file of the repository; all it has is then a header's."""
+        return unit.source.startswith(self.path("build") + os.sep)
 
     def add(self, source, like):
         """A unit for a file that no target compiles, with the flags of its nearest relative."""

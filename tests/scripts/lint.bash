@@ -56,6 +56,7 @@ project(birds LANGUAGES CXX)
 file(GLOB sources CONFIGURE_DEPENDS birds/*.cpp)
 add_library(birds OBJECT ${sources})
 target_include_directories(birds PRIVATE "${PROJECT_SOURCE_DIR}")
+target_compile_options(birds PRIVATE -Wsign-compare)
 END
 cat >CMakePresets.json <<'END'
 {
@@ -105,6 +106,15 @@ echo 'inline int *none = 0;' >>birds/sing.hpp
 lint 1
 says 'birds/sing\.hpp:3:20: error: use nullptr'
 says '0 units changed .* 70 include'
+
+case_of "a remark in a header that is due to one of the units that include it"
+printf '#pragma once\ntemplate <class T> bool isLess(T a, int b) { return a < b; }\n' >birds/alone.hpp
+for number in 1 2 3 4; do
+    printf '#include "birds/alone.hpp"\nbool less%d() { return isLess(%s, 3); }\n' "$number" \
+        "$( ((number == 3)) && echo 1U || echo 1)" >>"birds/bird$number.cpp"
+done
+lint 1
+says 'birds/alone\.hpp:2:55: error: comparison of integers of different signs'
 
 case_of "a remark in an unchanged unit, for a header's change"
 sed -i 's/nullptr/0/' birds/bird70.cpp
