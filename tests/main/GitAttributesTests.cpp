@@ -44,7 +44,8 @@ class GitAttributesTest : public vclink::test::BranchTest
     {
         const std::string output = repository_.git({"check-attr", "-z", name, "--", path});
         // Path, attribute and information, each with a NUL behind it.
-        const std::string information = output.substr(path.size() + name.size() + 2).c_str();
+        const std::size_t begin = path.size() + name.size() + 2;
+        const std::string information = output.substr(begin, output.find('\0', begin) - begin);
         if (information == "set")
             return name;
         if (information == "unset")

@@ -126,7 +126,9 @@ TEST_P(InstalledTools, TakeNoPartAfterAGuardHasEndedUntilTheNextBegins)
     divergeInLines();
     replaceAutoMerge("echo tool >\"$4\"\n");
     const std::string head = idOf("HEAD");
-    git::GitConfig();
+    {
+        const git::GitConfig withItsGuard;
+    }
     merge("topic");
     EXPECT_EQ(repository_.read("file"), both) << "merged as a text";
     repository_.git({"reset", "--quiet", "--hard", head});
