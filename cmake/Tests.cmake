@@ -7,7 +7,8 @@
 # under the sanitizers takes longer than most cases do. With EACH_CASE each case is a test, called
 # PROGRAM.SUITE.CASE, with a process of its own: for long cases, so that no processor idles at the
 # end, and for threads, which may race only where something is used for the first time. COST is the
-# time of a case in tenths of a second, 1 by default: ctest starts the longest tests first.
+# time of a case in tenths of a second, 1 by default: ctest starts the longest tests first. TIMEOUT
+# is that of a test, 600 by default.
 #
 # A skipped case is a failure, and so is a program that ends before its last case.
 add_library(vclink_test_complete_run OBJECT
@@ -24,7 +25,7 @@ function(vclink_discover_tests target)
         set(arg_COST 1)
     endif()
     if(NOT arg_TIMEOUT)
-        set(arg_TIMEOUT 300)
+        set(arg_TIMEOUT 600)
     endif()
     target_link_libraries(${target} PRIVATE vclink_test_complete_run)
     # A mutant may be unable to list its tests; scripts/mutate runs the programs itself.
