@@ -48,11 +48,13 @@ void noteCredentials(RemoteNotes &notes, std::string_view request)
     notes.credentials = kinds;
 }
 
-class Backend
+} // namespace
+
+class NotesBackend
     : public boost::log::sinks::basic_sink_backend<boost::log::sinks::synchronized_feeding>
 {
   public:
-    explicit Backend(RemoteNotes &notes) : notes_(notes)
+    explicit NotesBackend(RemoteNotes &notes) : notes_(notes)
     {
     }
 
@@ -68,11 +70,14 @@ class Backend
     RemoteNotes &notes_;
 };
 
-using Sink = boost::log::sinks::synchronous_sink<Backend>;
+using NotesSink = boost::log::sinks::synchronous_sink<NotesBackend>;
 
-boost::shared_ptr<Sink> makeSink(RemoteNotes &notes)
+namespace
 {
-    auto sink = boost::make_shared<Sink>(boost::make_shared<Backend>(notes));
+
+boost::shared_ptr<NotesSink> makeNotesSink(RemoteNotes &notes)
+{
+    auto sink = boost::make_shared<NotesSink>(boost::make_shared<NotesBackend>(notes));
     sink->set_filter([](const boost::log::attribute_value_set &values)
                      { return isFromLibrary(values, parameterSeverity); });
     return sink;
@@ -100,13 +105,13 @@ void takeNote(RemoteNotes &notes, const std::string &record)
 
 struct RemoteLog::Impl
 {
-    boost::shared_ptr<Sink> sink;
+    boost::shared_ptr<NotesSink> sink;
     unsigned severitiesBefore;
 };
 
 RemoteLog::RemoteLog(RemoteNotes &notes)
     : impl_(std::make_unique<Impl>(
-          Impl{makeSink(notes), vclink_host::getEnabledSeverities(libraryLogger)}))
+          Impl{makeNotesSink(notes), vclink_host::getEnabledSeverities(libraryLogger)}))
 {
     boost::log::core::get()->add_sink(impl_->sink);
     vclink_host::setEnabledSeverities(libraryLogger, impl_->severitiesBefore | parameterSeverity);

@@ -101,8 +101,6 @@ BaseMsgID makeCheckoutMessage(const std::string &path)
                      "ProgressCallbackCheckoutMessage");
 }
 
-} // namespace
-
 TEST_F(StandInCatalogue, SpeaksPlainEnglishByDefault)
 {
     const char *const texts[] = {
@@ -322,3 +320,5 @@ TEST_F(StandInLocaleDeathTest, BeginsWithTheFirstVariableThatIsNotEmpty)
                     testing::ExitedWithCode(0), "");
     }
 }
+
+} // namespace

@@ -18,7 +18,7 @@ namespace
 namespace fs = std::filesystem;
 using vclink::test::ChangeSequence;
 
-constexpr std::uint64_t blockCount = 10;
+constexpr std::uint64_t sequenceBlocks = 10;
 constexpr std::uint64_t sequencesInBlock = 30;
 
 /// 30 sequences a block; a block ends with the first that fails, and prints its seed and what was
@@ -93,6 +93,6 @@ TEST_P(ChangeSequences, LeaveWhatGitLeaves)
     }
 }
 
-INSTANTIATE_TEST_SUITE_P(Blocks, ChangeSequences, testing::Range<std::uint64_t>(0, blockCount));
+INSTANTIATE_TEST_SUITE_P(Blocks, ChangeSequences, testing::Range<std::uint64_t>(0, sequenceBlocks));
 
 } // namespace

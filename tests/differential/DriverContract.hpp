@@ -29,6 +29,9 @@ struct DriverOutcome
 bool operator==(const DriverOutcome &left, const DriverOutcome &right);
 std::ostream &operator<<(std::ostream &stream, const DriverOutcome &outcome);
 
+/// A file whose only line both sides have changed.
+inline const std::string conflictMarkers = "<<<<<<<\nours\n=======\ntheirs\n>>>>>>>\n";
+
 /// How the library's outcome is to stand to git's. The contents are those of the case's file, with
 /// its mode before them where it is not 100644.
 struct DriverExpectation

@@ -22,8 +22,6 @@ done)
 eval target=\${$position}
 printf '%s\n' "$text" >"$target")";
 
-const std::string markers = "<<<<<<<\nours\n=======\ntheirs\n>>>>>>>\n";
-
 DriverCase describes(const std::string &name, const std::string &words,
                      const DriverExpectation &expectation = {})
 {
@@ -53,7 +51,8 @@ DriverCase runs(const std::string &name, const std::string &script,
 
 DriverCase refuses(const std::string &name, const std::string &end)
 {
-    return runs(name, "echo kept >\"$2\"; " + end, {Kind::OtherFileInConflict, "kept\n", markers});
+    return runs(name, "echo kept >\"$2\"; " + end,
+                {Kind::OtherFileInConflict, "kept\n", conflictMarkers});
 }
 
 DriverCase commands(const std::string &name, const std::string &command,

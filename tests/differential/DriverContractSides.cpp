@@ -12,8 +12,6 @@ namespace
 
 using Kind = DriverExpectation;
 
-const std::string markers = "<<<<<<<\nours\n=======\ntheirs\n>>>>>>>\n";
-
 DriverCase leaves(const std::string &name, const std::string &script,
                   const DriverExpectation &expectation = {})
 {
@@ -178,7 +176,7 @@ std::vector<DriverCase> sideCases()
         sides("RemovedByTheirs", base, ours, removes("file")),
         // git gives the command an empty ancestor.
         sides("AddedByBoth", nothing, writes("file", "ours\n"), writes("file", "theirs\n"),
-              {Kind::OnlyGitMerges, "ours\ntheirs\nfile\n", markers}),
+              {Kind::OnlyGitMerges, "ours\ntheirs\nfile\n", conflictMarkers}),
         sides("AddedByBothAlike", nothing, writes("file", "same\n"), writes("file", "same\n")),
         sides("ChangedByTheirsOnly", base, writes("other", "x\n"), theirs),
         sides("ChangedByOursOnly", base, ours, writes("other", "x\n")),
@@ -272,7 +270,7 @@ std::vector<DriverCase> attributeCases()
         repository.git({"config", "merge.text.driver", command});
     };
     // libgit2's own drivers can't be replaced.
-    text.expectation = {Kind::OnlyGitMerges, "ours\nbase\ntheirs\n", markers};
+    text.expectation = {Kind::OnlyGitMerges, "ours\nbase\ntheirs\n", conflictMarkers};
     DriverCase inRepository = attributed("InTheRepositorysOwnFile", "");
     inRepository.configure =
         [](const GitRepository &repository, const HermeticEnvironment &, const std::string &command)
@@ -285,7 +283,8 @@ std::vector<DriverCase> attributeCases()
         attributed("Text", "* merge=text\n"),
         attributed("Union", "* merge=union\n"),
         // Only -merge, and -text with a driver's name, keep markers out.
-        attributed("Binary", "* merge=binary\n", {Kind::OtherFileInConflict, "ours\n", markers}),
+        attributed("Binary", "* merge=binary\n",
+                   {Kind::OtherFileInConflict, "ours\n", conflictMarkers}),
         attributed("Unset", "* -merge\n"),
         attributed("SetBack", "* merge=tool\nfile !merge\n"),
         attributed("Set", "* merge\n"),

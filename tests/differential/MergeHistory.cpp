@@ -16,11 +16,6 @@ namespace
 constexpr std::size_t tipCount = 3;
 constexpr std::size_t firstCommit = 1'577'836'800;
 
-std::string data(const std::string &bytes)
-{
-    return "data " + std::to_string(bytes.size()) + '\n' + bytes + '\n';
-}
-
 const TreeFile *find(const Tree &tree, const std::string &path)
 {
     const auto found = tree.find(path);
@@ -81,7 +76,8 @@ MergeHistory::Number MergeHistory::commit(const std::string &subject,
     const Number number = commits_.size();
     const std::string time = std::to_string(firstCommit + 60 * number);
     stream_ += "commit refs/heads/written\nmark :" + std::to_string(number + 1) +
-               "\ncommitter Author <author@example.com> " + time + " +0000\n" + data(subject);
+               "\ncommitter Author <author@example.com> " + time + " +0000\n" +
+               asFastImportData(subject);
     std::vector<bool> ancestors(number);
     for (const auto parent : parents)
     {
@@ -113,7 +109,8 @@ void MergeHistory::writeTree(const Tree &before, const Tree &after)
     {
         if (!areEqual(&file, find(before, path)))
         {
-            stream_ += "M " + file.mode + " inline " + quote(path) + '\n' + data(file.content);
+            stream_ +=
+                "M " + file.mode + " inline " + quote(path) + '\n' + asFastImportData(file.content);
         }
     }
     stream_ += '\n';

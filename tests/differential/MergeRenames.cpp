@@ -10,7 +10,7 @@ namespace vclink::test
 namespace
 {
 
-std::string folderOf(const std::string &path)
+std::string folderOfPath(const std::string &path)
 {
     const auto slash = path.rfind('/');
     return slash == std::string::npos ? std::string() : path.substr(0, slash);
@@ -125,7 +125,7 @@ bool MergeEdits::swapNames(Tree &one, Tree &other)
 bool MergeEdits::moveFolder(Tree &one, Tree &other)
 {
     const auto path = pickText(one, other);
-    const auto folder = path ? folderOf(*path) : std::string();
+    const auto folder = path ? folderOfPath(*path) : std::string();
     if (folder.empty())
     {
         return false;

@@ -8,9 +8,9 @@ namespace vclink::test
 namespace
 {
 
-constexpr std::size_t fewestLines = 6;
+constexpr std::size_t fewestRandomLines = 6;
 
-std::string makeLine(Random &random)
+std::string makeLetters(Random &random)
 {
     std::string line;
     for (std::size_t length = 12 + random.below(8); length > 0; --length)
@@ -23,9 +23,9 @@ std::string makeLine(Random &random)
 std::string makeLines(Random &random, const char *lineEnd)
 {
     std::string text;
-    for (std::size_t count = fewestLines + random.below(8); count > 0; --count)
+    for (std::size_t count = fewestRandomLines + random.below(8); count > 0; --count)
     {
-        text += makeLine(random) + lineEnd;
+        text += makeLetters(random) + lineEnd;
     }
     return text;
 }
@@ -39,11 +39,11 @@ std::string makeContent(Random &random)
     case 0:
         return {};
     case 1:
-        return makeLine(random);
+        return makeLetters(random);
     case 2:
         return makeLines(random, "\r\n");
     case 3:
-        return makeLine(random) + '\0' + '\xFF' + makeLine(random);
+        return makeLetters(random) + '\0' + '\xFF' + makeLetters(random);
     default:
         return makeLines(random, "\n");
     }
@@ -52,7 +52,7 @@ std::string makeContent(Random &random)
 std::string makeSimilar(Random &random, const std::string &content)
 {
     const auto lines = std::count(content.begin(), content.end(), '\n');
-    if (static_cast<std::size_t>(lines) < fewestLines)
+    if (static_cast<std::size_t>(lines) < fewestRandomLines)
     {
         return makeContent(random);
     }
@@ -62,7 +62,7 @@ std::string makeSimilar(Random &random, const std::string &content)
         begin = content.find('\n', begin) + 1;
     }
     std::string similar = content;
-    return similar.replace(begin, content.find('\n', begin) - begin, makeLine(random));
+    return similar.replace(begin, content.find('\n', begin) - begin, makeLetters(random));
 }
 
 std::string makeSameSize(Random &random, const std::string &content)
@@ -85,7 +85,7 @@ std::string makeIgnoreRules(Random &random)
         "src/a*", "**/deep",  "deep/**",    "\\#*",      "\\!*",       "a b*",
         "*.c",    "!*1.c",    "*\xC3\xBC*", "[ab]*.txt", "\xFF*",      "/a",
         "dir?/",  "a/*",      "*",          "data*.bin"};
-    std::string text = "# " + makeLine(random) + "\n\n";
+    std::string text = "# " + makeLetters(random) + "\n\n";
     for (std::size_t count = 1 + random.below(5); count > 0; --count)
     {
         text += random.pick(rules) + '\n';
@@ -95,7 +95,7 @@ std::string makeIgnoreRules(Random &random)
 
 std::string makeConflictMarkers(Random &random)
 {
-    return "<<<<<<< ours\n" + makeLine(random) + "\n=======\n" + makeLine(random) +
+    return "<<<<<<< ours\n" + makeLetters(random) + "\n=======\n" + makeLetters(random) +
            "\n>>>>>>> theirs\n";
 }
 

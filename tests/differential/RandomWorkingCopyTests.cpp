@@ -24,7 +24,7 @@ using vclink::test::LibGit2Session;
 using vclink::test::OtherRepository;
 using vclink::test::RandomWorkingCopy;
 
-constexpr std::uint64_t blockCount = 20;
+constexpr std::uint64_t copyBlocks = 20;
 constexpr std::uint64_t copiesInBlock = 25;
 constexpr std::size_t stateCount = 8;
 
@@ -95,6 +95,6 @@ TEST_P(RandomWorkingCopies, HaveTheStatesThatGitReports)
     EXPECT_EQ(states().size(), stateCount) << "the copies are too much alike";
 }
 
-INSTANTIATE_TEST_SUITE_P(Blocks, RandomWorkingCopies, testing::Range<std::uint64_t>(0, blockCount));
+INSTANTIATE_TEST_SUITE_P(Blocks, RandomWorkingCopies, testing::Range<std::uint64_t>(0, copyBlocks));
 
 } // namespace

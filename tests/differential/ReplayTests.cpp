@@ -42,7 +42,7 @@ using vclink::test::MergedPaths;
 using vclink::test::MergeHistory;
 using States = std::map<std::string, vclink::FileState::State>;
 
-constexpr std::uint64_t blockCount = 8;
+constexpr std::uint64_t mergeBlocks = 8;
 constexpr std::size_t mergeCount = 208;
 constexpr std::uint64_t usualSeed = 1;
 
@@ -293,8 +293,8 @@ class MergeReplay : public vclink::test::GitTest, public testing::WithParamInter
 TEST_P(MergeReplay, GivesWhatLibGit2GivesAndDiffersFromGitByRuleOnly)
 {
     ASSERT_GE(merges().size(), mergeCount);
-    const auto first = merges().size() * GetParam() / blockCount;
-    const auto end = merges().size() * (GetParam() + 1) / blockCount;
+    const auto first = merges().size() * GetParam() / mergeBlocks;
+    const auto end = merges().size() * (GetParam() + 1) / mergeBlocks;
     for (auto number = first; number < end; ++number)
     {
         const MergeCommit &merge = merges()[number];
@@ -349,6 +349,6 @@ TEST_F(MergeHistories, DependOnTheSeedAlone)
     EXPECT_EQ(tips.size(), 2u);
 }
 
-INSTANTIATE_TEST_SUITE_P(Blocks, MergeReplay, testing::Range<std::uint64_t>(0, blockCount));
+INSTANTIATE_TEST_SUITE_P(Blocks, MergeReplay, testing::Range<std::uint64_t>(0, mergeBlocks));
 
 } // namespace

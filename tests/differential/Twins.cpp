@@ -24,18 +24,13 @@ namespace fs = std::filesystem;
 
 const std::string mainBranch = ".git/refs/heads/main";
 
-void run(const Command &command)
+void runImport(const Command &command)
 {
     const CommandResult result = command.run();
     if (!result.succeeded())
     {
         throw std::runtime_error(command.text() + ": " + result.errors);
     }
-}
-
-std::string data(const std::string &bytes)
-{
-    return "data " + std::to_string(bytes.size()) + '\n' + bytes + '\n';
 }
 
 void replaceAll(std::string &text, const std::string &from, const std::string &to)
@@ -49,13 +44,13 @@ void replaceAll(std::string &text, const std::string &from, const std::string &t
 std::string makeStream(const std::string &branch, const std::vector<PlannedFile> &files)
 {
     std::string stream = "commit refs/heads/" + branch +
-                         "\ncommitter A <a@example.com> 1577836800 +0000\n" + data("aside") +
-                         "from refs/heads/main^0\n";
+                         "\ncommitter A <a@example.com> 1577836800 +0000\n" +
+                         asFastImportData("aside") + "from refs/heads/main^0\n";
     for (const auto &file : files)
     {
         stream += file.mode.empty() ? "D " + quote(file.path) + '\n'
                                     : "M " + file.mode + " inline " + quote(file.path) + '\n' +
-                                          data(file.content);
+                                          asFastImportData(file.content);
     }
     return stream;
 }
@@ -136,7 +131,8 @@ void Twins::branch(const std::string &name, const std::vector<PlannedFile> &file
     }
     for (auto *twin : {&library_, &git_})
     {
-        run(twin->repository().command({"fast-import", "--quiet"}).input(makeStream(name, files)));
+        runImport(
+            twin->repository().command({"fast-import", "--quiet"}).input(makeStream(name, files)));
         describeHead(*twin, ".git/refs/heads/" + name);
     }
 }

@@ -55,4 +55,9 @@ std::string quoteConfigValue(const std::string &value)
     return text + '"';
 }
 
+std::string asFastImportData(const std::string &bytes)
+{
+    return "data " + std::to_string(bytes.size()) + '\n' + bytes + '\n';
+}
+
 } // namespace vclink::test

@@ -13,4 +13,7 @@ std::string quote(const std::string &text);
 /// A value as one of Git's configuration files holds it.
 std::string quoteConfigValue(const std::string &value);
 
+/// A content, or a message of a commit, as fast-import reads it.
+std::string asFastImportData(const std::string &bytes);
+
 } // namespace vclink::test

@@ -62,7 +62,7 @@ struct Lack
     mode_t mode;
 };
 
-bool begins(const std::string &text, const std::string &beginning)
+bool beginsWith(const std::string &text, const std::string &beginning)
 {
     return text.compare(0, beginning.size(), beginning) == 0;
 }
@@ -81,7 +81,7 @@ class WithoutPermission : public vclink::test::DiskTest
     {
         const fs::path root = trial().repository().path();
         const std::string &name = GetParam().name;
-        if (begins(name, "write"))
+        if (beginsWith(name, "write"))
             return {{environment().home(), 0555}, {environment().home() / ".gitconfig", 0000}};
         std::vector<Lack> all{
             {root, 0555},
@@ -121,7 +121,7 @@ class WithoutPermission : public vclink::test::DiskTest
     {
         const bool isHeadless =
             lack.mode == 0000 && (lack.path.filename() == "HEAD" || lack.path.filename() == "refs");
-        if (begins(GetParam().name, "revertFiles") && isHeadless)
+        if (beginsWith(GetParam().name, "revertFiles") && isHeadless)
             return {"entry file", "entry other"};
         return {};
     }

@@ -15,7 +15,9 @@
 #include "error/errorUtil/callbackException.hpp"
 #include "error/errorUtil/setGitError.hpp"
 #include "error/logging/severity.hpp"
+#include "error/makeError.hpp"
 #include "support/LogCapture.hpp"
+#include "support/isRecord.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
 
 namespace vclink::git
@@ -24,30 +26,19 @@ namespace
 {
 
 using test::HermeticLibGit2;
+using test::isRecord;
 using test::LogCapture;
-using test::LogRecord;
+using test::makeError;
 using testing::ElementsAre;
 using testing::IsEmpty;
 
-const std::string signature =
+const std::string throwIfErrorSignature =
     "static void vclink::git::GitErrorPolicy::throwIfError(const vclink::git::GitError&)";
 
 struct FromCallback : std::runtime_error
 {
     using std::runtime_error::runtime_error;
 };
-
-GitError makeError(int code, int errorClass, const char *text)
-{
-    git_error_set_str(errorClass, text);
-    return GitError(code);
-}
-
-auto isRecord(unsigned severity, const std::string &message)
-{
-    return testing::AllOf(testing::Field(&LogRecord::severity, severity),
-                          testing::Field(&LogRecord::message, message));
-}
 
 /// The address of the exception object that a pointer holds.
 const void *objectOf(const std::exception_ptr &pointer)
@@ -128,18 +119,18 @@ TEST_F(ThrowIfError, TracesItsEntryAndItsThrow)
     const GitError error = makeError(-3, GIT_ERROR_REFERENCE, "gone");
     const LogCapture log;
     EXPECT_THROW(GitErrorPolicy::throwIfError(error), LibGit2Exception);
-    EXPECT_THAT(log.records(),
-                ElementsAre(isRecord(0x20, signature), isRecord(0x08, "Throwing error gone (-3)"),
-                            isRecord(0x40, signature + " [throw]")));
+    EXPECT_THAT(log.records(), ElementsAre(isRecord(0x20, throwIfErrorSignature),
+                                           isRecord(0x08, "Throwing error gone (-3)"),
+                                           isRecord(0x40, throwIfErrorSignature + " [throw]")));
 }
 
 TEST_F(ThrowIfError, TracesItsReturn)
 {
     const LogCapture log;
     GitErrorPolicy::throwIfError(GitError());
-    EXPECT_THAT(log.records(),
-                ElementsAre(isRecord(0x20, signature), isRecord(0x08, "Throwing error  (0)"),
-                            isRecord(0x40, signature)));
+    EXPECT_THAT(log.records(), ElementsAre(isRecord(0x20, throwIfErrorSignature),
+                                           isRecord(0x08, "Throwing error  (0)"),
+                                           isRecord(0x40, throwIfErrorSignature)));
 }
 
 TEST_F(ThrowIfError, WritesNothingWhereNothingIsEnabled)
@@ -168,9 +159,9 @@ TEST_F(ThrowIfError, RethrowsTheVeryObjectThatWaitsInTheSlot)
         EXPECT_STREQ(exception.what(), "from the callback");
     }
     EXPECT_EQ(pendingCallbackException(), nullptr);
-    EXPECT_THAT(log.records(), ElementsAre(isRecord(0x20, signature),
+    EXPECT_THAT(log.records(), ElementsAre(isRecord(0x20, throwIfErrorSignature),
                                            isRecord(0x08, "Re-throwing error from callback"),
-                                           isRecord(0x40, signature + " [throw]")));
+                                           isRecord(0x40, throwIfErrorSignature + " [throw]")));
 }
 
 TEST_F(ThrowIfError, RethrowsAnExceptionOfAnyType)

@@ -14,9 +14,8 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include "error/catalogueText.hpp"
 #include "error/logging/severity.hpp"
-#include "fl/i18n/MessageCatalog.hpp"
-#include "fl/i18n/VkLocale.hpp"
 #include "fl/i18n/convert.hpp"
 #include "support/LogCapture.hpp"
 #include "vclink/git/messageIdentifiers.hpp"
@@ -33,13 +32,9 @@ using foundation::core::except::IUserException;
 using resource_core::GenericMsgIDHolder;
 using shared_vclink::git::LibGit2Error;
 using shared_vclink::git::MergeFailed;
+using test::catalogueText;
 using test::LogCapture;
 using testing::IsEmpty;
-
-ustring catalogueText(const resource_core::BaseMsgID &message)
-{
-    return fl::i18n::MessageCatalog::get_message(message, fl::i18n::VkLocale::global());
-}
 
 std::vector<const void *> framesOf(const StackTraceRecordingException &exception)
 {

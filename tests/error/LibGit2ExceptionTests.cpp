@@ -9,7 +9,7 @@
 #include <gtest/gtest.h>
 
 #include "error/HermeticLibGit2.hpp"
-#include "error/errorUtil/setGitError.hpp"
+#include "error/makeError.hpp"
 #include "fl/i18n/convert.hpp"
 #include "vclink/git/messageIdentifiers.hpp"
 
@@ -19,12 +19,7 @@ namespace
 {
 
 using test::HermeticLibGit2;
-
-GitError makeError(int code, int errorClass, const char *text)
-{
-    git_error_set_str(errorClass, text);
-    return GitError(code);
-}
+using test::makeError;
 
 void expectFailure(const LibGit2Exception &exception, int code, int errorClass, const ustring &text)
 {

@@ -9,26 +9,21 @@
 #include <gtest/gtest.h>
 
 #include "support/LogCapture.hpp"
+#include "support/isRecord.hpp"
 
 namespace vclink::git
 {
 namespace
 {
 
+using test::isRecord;
 using test::LogCapture;
-using test::LogRecord;
 using testing::ElementsAre;
 using testing::IsEmpty;
 
 static_assert(!std::is_copy_constructible_v<ScopeTrace> && !std::is_copy_assignable_v<ScopeTrace>);
 
-constexpr const char *signature = "void traced(int)";
-
-auto isRecord(unsigned severity, const std::string &message)
-{
-    return testing::AllOf(testing::Field(&LogRecord::severity, severity),
-                          testing::Field(&LogRecord::message, message));
-}
+constexpr const char *tracedSignature = "void traced(int)";
 
 void enable(unsigned severities)
 {
@@ -39,15 +34,16 @@ TEST(ScopeTrace, WritesItsSignatureAtEntryAndAtExit)
 {
     const LogCapture log;
     {
-        const ScopeTrace trace(logger(), signature, "folder/file", 12);
-        EXPECT_THAT(log.records(), ElementsAre(isRecord(0x20, signature)));
+        const ScopeTrace trace(logger(), tracedSignature, "folder/file", 12);
+        EXPECT_THAT(log.records(), ElementsAre(isRecord(0x20, tracedSignature)));
     }
-    EXPECT_THAT(log.records(), ElementsAre(isRecord(0x20, signature), isRecord(0x40, signature)));
+    EXPECT_THAT(log.records(),
+                ElementsAre(isRecord(0x20, tracedSignature), isRecord(0x40, tracedSignature)));
 }
 
 TEST(ScopeTrace, HoldsPathAndLine)
 {
-    const ScopeTrace trace(logger(), signature, "folder/file", 12);
+    const ScopeTrace trace(logger(), tracedSignature, "folder/file", 12);
     EXPECT_STREQ(trace.getPath(), "folder/file");
     EXPECT_EQ(trace.getLine(), 12u);
 }
@@ -74,14 +70,15 @@ TEST(ScopeTrace, TellsThatAnExceptionPasses)
     const LogCapture log;
     try
     {
-        const ScopeTrace trace(logger(), signature, "file", 1);
+        const ScopeTrace trace(logger(), tracedSignature, "file", 1);
         throw std::runtime_error("passing");
     }
     catch (const std::runtime_error &)
     {
         EXPECT_EQ(logger().scope_depth(), 0);
     }
-    EXPECT_THAT(log.messages(SeverityScopeExit), ElementsAre(std::string(signature) + " [throw]"));
+    EXPECT_THAT(log.messages(SeverityScopeExit),
+                ElementsAre(std::string(tracedSignature) + " [throw]"));
 }
 
 TEST(ScopeTrace, TellsNoExceptionInsideAHandler)
@@ -93,9 +90,9 @@ TEST(ScopeTrace, TellsNoExceptionInsideAHandler)
     }
     catch (const std::runtime_error &)
     {
-        const ScopeTrace trace(logger(), signature, "file", 1);
+        const ScopeTrace trace(logger(), tracedSignature, "file", 1);
     }
-    EXPECT_THAT(log.messages(SeverityScopeExit), ElementsAre(signature));
+    EXPECT_THAT(log.messages(SeverityScopeExit), ElementsAre(tracedSignature));
 }
 
 /// Opens a scope when it is destroyed.
@@ -103,7 +100,7 @@ struct TracesItsEnd
 {
     ~TracesItsEnd()
     {
-        const ScopeTrace trace(logger(), signature, "file", 1);
+        const ScopeTrace trace(logger(), tracedSignature, "file", 1);
     }
 };
 
@@ -118,7 +115,7 @@ TEST(ScopeTrace, TellsAnExceptionThatPassesElsewhereOnTheThread)
     catch (const std::runtime_error &)
     {
         EXPECT_THAT(log.messages(SeverityScopeExit),
-                    ElementsAre(std::string(signature) + " [throw]"));
+                    ElementsAre(std::string(tracedSignature) + " [throw]"));
     }
 }
 
@@ -126,7 +123,7 @@ TEST(ScopeTrace, DoesNothingWhenItsEntryIsDisabled)
 {
     const LogCapture log(~static_cast<unsigned>(SeverityScopeEntry));
     {
-        const ScopeTrace trace(logger(), signature, "file", 1);
+        const ScopeTrace trace(logger(), tracedSignature, "file", 1);
         EXPECT_EQ(logger().scope_depth(), 0);
         enable(LogCapture::allSeverities);
     }
@@ -138,23 +135,24 @@ TEST(ScopeTrace, StillEndsWhenItsEntryIsDisabledMeanwhile)
 {
     const LogCapture log;
     {
-        const ScopeTrace trace(logger(), signature, "file", 1);
+        const ScopeTrace trace(logger(), tracedSignature, "file", 1);
         EXPECT_EQ(logger().scope_depth(), 1);
         enable(SeverityScopeExit);
     }
     EXPECT_EQ(logger().scope_depth(), 0);
-    EXPECT_THAT(log.records(), ElementsAre(isRecord(0x20, signature), isRecord(0x40, signature)));
+    EXPECT_THAT(log.records(),
+                ElementsAre(isRecord(0x20, tracedSignature), isRecord(0x40, tracedSignature)));
 }
 
 TEST(ScopeTrace, CountsWithoutARecordWhenOnlyItsExitIsDisabled)
 {
     const LogCapture log(SeverityScopeEntry);
     {
-        const ScopeTrace trace(logger(), signature, "file", 1);
+        const ScopeTrace trace(logger(), tracedSignature, "file", 1);
         EXPECT_EQ(logger().scope_depth(), 1);
     }
     EXPECT_EQ(logger().scope_depth(), 0);
-    EXPECT_THAT(log.records(), ElementsAre(isRecord(0x20, signature)));
+    EXPECT_THAT(log.records(), ElementsAre(isRecord(0x20, tracedSignature)));
 }
 
 TEST(ScopeTrace, TracesTheLoggerThatItIsGiven)
@@ -163,12 +161,12 @@ TEST(ScopeTrace, TracesTheLoggerThatItIsGiven)
     const LogCapture log(LogCapture::allSeverities, "another logger");
     const LogCapture own;
     {
-        const ScopeTrace trace(other, signature, "file", 1);
+        const ScopeTrace trace(other, tracedSignature, "file", 1);
         EXPECT_EQ(other.scope_depth(), 1);
         EXPECT_EQ(logger().scope_depth(), 0);
     }
     EXPECT_EQ(other.scope_depth(), 0);
-    EXPECT_THAT(log.messages(), ElementsAre(signature, signature));
+    EXPECT_THAT(log.messages(), ElementsAre(tracedSignature, tracedSignature));
     EXPECT_THAT(own.messages(), IsEmpty());
 }
 

@@ -11,10 +11,9 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include "error/catalogueText.hpp"
 #include "error/logging/severity.hpp"
 #include "error/raise.hpp"
-#include "fl/i18n/MessageCatalog.hpp"
-#include "fl/i18n/VkLocale.hpp"
 #include "support/LogCapture.hpp"
 #include "support/diagnosticText.hpp"
 #include "vclink/git/GitException.hpp"
@@ -27,6 +26,7 @@ namespace
 
 using shared_vclink::git::HasConflicts;
 using shared_vclink::git::MergeFailed;
+using test::catalogueText;
 using test::diagnosticTextOf;
 using test::LogCapture;
 using testing::ElementsAre;
@@ -64,11 +64,6 @@ struct TwoTexts : foundation::core::except::IMsgIDException, std::exception
 struct BoostOnly : virtual boost::exception
 {
 };
-
-ustring catalogueText(const resource_core::BaseMsgID &message)
-{
-    return fl::i18n::MessageCatalog::get_message(message, fl::i18n::VkLocale::global());
-}
 
 /// Throws with `raiseIt`, replaces the exception, and gives the text of what comes out.
 template <class Raise> ustring textOfReplacement(Raise raiseIt)

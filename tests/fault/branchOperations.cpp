@@ -16,7 +16,7 @@ namespace
 
 using git::BranchManager;
 
-std::string textOf(const std::vector<git::BranchPointer> &branches)
+std::string namesOf(const std::vector<git::BranchPointer> &branches)
 {
     std::string text;
     for (const auto &branch : branches)
@@ -50,12 +50,12 @@ std::function<Action(const Subject &)> doing(void (*operation)(BranchManager &))
 
 std::string getLocalBranches(BranchManager &branches)
 {
-    return textOf(branches.getLocalBranches());
+    return namesOf(branches.getLocalBranches());
 }
 
 std::string getRemoteBranches(BranchManager &branches)
 {
-    return textOf(branches.getRemoteBranches());
+    return namesOf(branches.getRemoteBranches());
 }
 
 std::string getHeadRevision(BranchManager &branches)

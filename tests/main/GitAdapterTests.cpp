@@ -12,6 +12,7 @@
 #include "AdapterTest.hpp"
 #include "TestOptionsFactory.hpp"
 #include "support/Descriptors.hpp"
+#include "support/LibGit2Session.hpp"
 #include "support/text.hpp"
 #include "vclink/exception/SourceControlException.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
@@ -25,14 +26,8 @@ using vclink::git::GitAdapter;
 using vclink::git::LibGit2Exception;
 using vclink::test::asPath;
 using vclink::test::asUtf8;
+using vclink::test::countLibGit2Starts;
 using vclink::test::TestOptionsFactory;
-
-int countStarts()
-{
-    const int count = git_libgit2_init() - 1;
-    git_libgit2_shutdown();
-    return count;
-}
 
 class GitAdapterTest : public vclink::test::AdapterTest
 {
@@ -155,14 +150,14 @@ TEST_F(GitAdapterTest, AsksTheFactoryForTheOptionsOfEachWalk)
 /// The factory goes when the interactor and the callbacks have gone, and before the guard.
 TEST_F(GitAdapterTest, EndsTheGuardLast)
 {
-    const int before = countStarts();
+    const int before = countLibGit2Starts();
     int startsAtTheFactorysEnd = 0;
     long sharesAtTheFactorysEnd = 0;
     auto interactor = std::make_shared<vclink::test::TestInteractor>();
     auto factory = std::make_shared<TestOptionsFactory>(interactor);
     factory->onDestruction = [&, watched = std::weak_ptr<ApplicationInteractor>(interactor)]
     {
-        startsAtTheFactorysEnd = countStarts();
+        startsAtTheFactorysEnd = countLibGit2Starts();
         sharesAtTheFactorysEnd = watched.use_count();
     };
     auto adapter = std::make_unique<GitAdapter>(asPath(folder().path()), std::move(factory));
@@ -172,7 +167,7 @@ TEST_F(GitAdapterTest, EndsTheGuardLast)
     EXPECT_EQ(startsAtTheFactorysEnd, before + 1);
     // Its own.
     EXPECT_EQ(sharesAtTheFactorysEnd, 1);
-    EXPECT_EQ(countStarts(), before);
+    EXPECT_EQ(countLibGit2Starts(), before);
 }
 
 TEST_F(GitAdapterTest, CannotBeCopied)

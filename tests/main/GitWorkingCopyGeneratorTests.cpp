@@ -9,7 +9,6 @@
 #include <utility>
 #include <vector>
 
-#include <git2.h>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
@@ -18,6 +17,7 @@
 #include "error/VirtualTable.hpp"
 #include "error/logging/severity.hpp"
 #include "support/Descriptors.hpp"
+#include "support/LibGit2Session.hpp"
 #include "support/LogCapture.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
 
@@ -31,6 +31,7 @@ using testing::IsEmpty;
 using testing::StartsWith;
 using vclink::test::asPath;
 using vclink::test::asUtf16;
+using vclink::test::countLibGit2Starts;
 using vclink::test::GitRepository;
 using vclink::test::libGit2FailureOf;
 using vclink::test::LogCapture;
@@ -43,15 +44,8 @@ static_assert(sizeof(Generator) ==
               sizeof(void *) + sizeof(std::unique_ptr<int, std::function<void(int *)>>));
 static_assert(!std::is_copy_constructible_v<Generator> && !std::is_copy_assignable_v<Generator>);
 
-const std::string signature =
+const std::string generateSignature =
     "virtual void vclink::git::GitWorkingCopyGenerator::generate(const ustring&, const upath&)";
-
-int countStarts()
-{
-    const int count = git_libgit2_init() - 1;
-    git_libgit2_shutdown();
-    return count;
-}
 
 class GeneratorObject : public vclink::test::CloneTest
 {
@@ -89,24 +83,24 @@ TEST_F(GeneratorObject, TakesSharesOfTheInteractorAndReleasesThem)
 
 TEST_F(GeneratorObject, StartsLibGit2FirstAndStopsItLast)
 {
-    const int before = countStarts();
+    const int before = countLibGit2Starts();
     int startsAtTheFactorysEnd = 0;
     long sharesAtTheFactorysEnd = 0;
     auto interactor = std::make_shared<vclink::test::TestInteractor>();
     auto factory = std::make_unique<TestOptionsFactory>(interactor);
     factory->onDestruction = [&]
     {
-        startsAtTheFactorysEnd = countStarts();
+        startsAtTheFactorysEnd = countLibGit2Starts();
         sharesAtTheFactorysEnd = interactor.use_count();
     };
     auto made = std::make_unique<Generator>(std::unique_ptr<git::GitOptionsFactory>(
         std::unique_ptr<TestOptionsFactory>(std::move(factory))));
-    EXPECT_EQ(countStarts(), before + 1);
+    EXPECT_EQ(countLibGit2Starts(), before + 1);
     EXPECT_EQ(interactor.use_count(), 3);
     made.reset();
     EXPECT_EQ(startsAtTheFactorysEnd, before + 1);
     EXPECT_EQ(sharesAtTheFactorysEnd, 2) << "the callbacks go before the factory";
-    EXPECT_EQ(countStarts(), before);
+    EXPECT_EQ(countLibGit2Starts(), before);
 }
 
 TEST_F(GeneratorObject, AsksItsFactoryForTheOptionsOfEachClone)
@@ -200,12 +194,12 @@ TEST_P(Clone, IsTracedWithItsParameters)
     generate();
     const auto records = log.records();
     ASSERT_GE(records.size(), 3U);
-    EXPECT_EQ(records[0].message, signature);
+    EXPECT_EQ(records[0].message, generateSignature);
     EXPECT_EQ(records[0].severity, git::SeverityScopeEntry);
     EXPECT_EQ(records[1].message, " repositorySpecifier=" + nameOf(server_) +
                                       " sandboxRoot.string()=" + clone_.path().string());
     EXPECT_EQ(records[1].severity, git::SeverityParameter);
-    EXPECT_EQ(records.back().message, signature);
+    EXPECT_EQ(records.back().message, generateSignature);
     EXPECT_EQ(records.back().severity, git::SeverityScopeExit);
 }
 
@@ -214,8 +208,8 @@ TEST_P(Clone, IsTracedWithItsFailure)
     const LogCapture log(git::SeverityScopeEntry | git::SeverityScopeExit);
     EXPECT_THROW(generate("file:///nowhere/gr\xC3\xBC\xC3\x9F", clone_.path()),
                  git::LibGit2Exception);
-    EXPECT_EQ(log.messages().front(), signature);
-    EXPECT_EQ(log.messages().back(), signature + " [throw]");
+    EXPECT_EQ(log.messages().front(), generateSignature);
+    EXPECT_EQ(log.messages().back(), generateSignature + " [throw]");
 }
 
 TEST_P(Clone, WritesNoParametersWhenTheirSeverityIsOff)

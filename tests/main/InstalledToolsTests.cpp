@@ -25,10 +25,10 @@ using vclink::test::GitRepository;
 using vclink::test::InstallPath;
 using vclink::test::LogCapture;
 
-const std::string ancestor = "1\n2\n3\n4\n5\n6\n7\n8\n9\n";
-const std::string ours = "ours\n2\n3\n4\n5\n6\n7\n8\n9\n";
-const std::string theirs = "1\n2\n3\n4\n5\n6\n7\n8\ntheirs\n";
-const std::string both = "ours\n2\n3\n4\n5\n6\n7\n8\ntheirs\n";
+const std::string ancestorText = "1\n2\n3\n4\n5\n6\n7\n8\n9\n";
+const std::string ourText = "ours\n2\n3\n4\n5\n6\n7\n8\n9\n";
+const std::string theirText = "1\n2\n3\n4\n5\n6\n7\n8\ntheirs\n";
+const std::string bothTexts = "ours\n2\n3\n4\n5\n6\n7\n8\ntheirs\n";
 
 /// The host's own launchers, installed below a folder of the test, whose values are written into
 /// the user's configuration. The parameter is the folder's name.
@@ -57,8 +57,8 @@ class InstalledTools : public vclink::test::MergeTest,
     {
         return folder() / GetParam();
     }
-    void divergeInLines(const std::string &oursOfFile = ours,
-                        const std::string &theirsOfFile = theirs)
+    void divergeInLines(const std::string &oursOfFile = ourText,
+                        const std::string &theirsOfFile = theirText)
     {
         repository_.write(".gitattributes", "file merge=vkAutoMerge\n");
         repository_.commitAll("attributes");
@@ -99,7 +99,7 @@ TEST_P(InstalledTools, MergeInARealMerge)
         expectStarted(log);
         EXPECT_THAT(log.messages(), testing::Contains("Auto-merge successful"));
     }
-    EXPECT_EQ(repository_.read("file"), both);
+    EXPECT_EQ(repository_.read("file"), bothTexts);
     EXPECT_THAT(parents(), ElementsAre(head, idOf("topic")));
     EXPECT_THAT(status(), IsEmpty());
     EXPECT_TRUE(nothingIsLeft());
@@ -109,7 +109,7 @@ TEST_P(InstalledTools, MergeToTheSameInGit)
 {
     divergeInLines();
     expectAsGit();
-    EXPECT_EQ(repository_.read("file"), both);
+    EXPECT_EQ(repository_.read("file"), bothTexts);
 }
 
 /// Not libgit2's own merge of texts, which would come to the same.
@@ -118,7 +118,7 @@ TEST_P(InstalledTools, AreWhatDecidesTheResult)
     divergeInLines();
     replaceAutoMerge("cat \"$1\" \"$2\" \"$3\" >\"$4.new\" && mv \"$4.new\" \"$4\"\n");
     merge("topic");
-    EXPECT_EQ(repository_.read("file"), ancestor + ours + theirs);
+    EXPECT_EQ(repository_.read("file"), ancestorText + ourText + theirText);
 }
 
 TEST_P(InstalledTools, TakeNoPartAfterAGuardHasEndedUntilTheNextBegins)
@@ -130,7 +130,7 @@ TEST_P(InstalledTools, TakeNoPartAfterAGuardHasEndedUntilTheNextBegins)
         const git::GitConfig withItsGuard;
     }
     merge("topic");
-    EXPECT_EQ(repository_.read("file"), both) << "merged as a text";
+    EXPECT_EQ(repository_.read("file"), bothTexts) << "merged as a text";
     repository_.git({"reset", "--quiet", "--hard", head});
     const git::LibGit2Guard next;
     merge("topic");
@@ -166,15 +166,15 @@ TEST_P(InstalledTools, ThatAreGoneFailTheMerge)
 
 TEST_P(InstalledTools, ServeGitsMergeTool)
 {
-    diverge([this] { repository_.write("file", ours); },
-            [this] { repository_.write("file", theirs); });
+    diverge([this] { repository_.write("file", ourText); },
+            [this] { repository_.write("file", theirText); });
     // A conflict that the tool can merge, since only git is told to leave the file alone.
     repository_.write(".git/info/attributes", "file -merge\n");
     EXPECT_FALSE(repository_.tryGit({"merge", "--quiet", "--no-edit", "topic"}).succeeded());
     const auto result = repository_.tryGit(
         {"-c", "mergetool.keepBackup=false", "mergetool", "--no-prompt", "--tool", "vkMerge"});
     EXPECT_TRUE(result.succeeded()) << result.output << result.errors;
-    EXPECT_EQ(repository_.read("file"), both);
+    EXPECT_EQ(repository_.read("file"), bothTexts);
     EXPECT_THAT(conflicts(), IsEmpty());
 }
 
@@ -193,7 +193,7 @@ TEST_P(InstalledTools, TellGitsMergeToolWhatTheyCannotMerge)
 
 TEST_P(InstalledTools, ServeGitsDiffTool)
 {
-    repository_.write("file", ours);
+    repository_.write("file", ourText);
     const auto result = repository_.tryGit({"difftool", "--no-prompt", "--tool", "vkDiff"});
     EXPECT_TRUE(result.succeeded()) << result.errors;
     EXPECT_THAT(result.output, HasSubstr("\n-1\n+ours\n 2\n"));

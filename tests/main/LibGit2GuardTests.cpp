@@ -8,6 +8,7 @@
 #include <gtest/gtest.h>
 
 #include "support/GitTest.hpp"
+#include "support/LibGit2Session.hpp"
 #include "support/TestInteractor.hpp"
 #include "support/text.hpp"
 #include "vclink/git/GitAdapterFactory.hpp"
@@ -21,28 +22,21 @@ using vclink::git::GitAdapterFactory;
 using vclink::git::LibGit2Exception;
 using vclink::git::LibGit2Guard;
 using vclink::test::asPath;
-
-/// libgit2's own count of its starts.
-int countStarts()
-{
-    const int count = git_libgit2_init() - 1;
-    git_libgit2_shutdown();
-    return count;
-}
+using vclink::test::countLibGit2Starts;
 
 class LibGit2GuardTest : public vclink::test::GitTest
 {
   protected:
-    const int before_ = countStarts();
+    const int before_ = countLibGit2Starts();
 };
 
 TEST_F(LibGit2GuardTest, KeepsLibGit2AliveForItsLife)
 {
     {
         const LibGit2Guard guard;
-        EXPECT_EQ(countStarts(), before_ + 1);
+        EXPECT_EQ(countLibGit2Starts(), before_ + 1);
     }
-    EXPECT_EQ(countStarts(), before_);
+    EXPECT_EQ(countLibGit2Starts(), before_);
 }
 
 TEST_F(LibGit2GuardTest, NestsByLibGit2sOwnCount)
@@ -51,9 +45,9 @@ TEST_F(LibGit2GuardTest, NestsByLibGit2sOwnCount)
     {
         const LibGit2Guard inner;
         const LibGit2Guard innermost;
-        EXPECT_EQ(countStarts(), before_ + 3);
+        EXPECT_EQ(countLibGit2Starts(), before_ + 3);
     }
-    EXPECT_EQ(countStarts(), before_ + 1);
+    EXPECT_EQ(countLibGit2Starts(), before_ + 1);
 }
 
 TEST_F(LibGit2GuardTest, MayEndInAnyOrder)
@@ -61,12 +55,12 @@ TEST_F(LibGit2GuardTest, MayEndInAnyOrder)
     std::optional<LibGit2Guard> first(std::in_place);
     std::optional<LibGit2Guard> second(std::in_place);
     first.reset();
-    EXPECT_EQ(countStarts(), before_ + 1);
+    EXPECT_EQ(countLibGit2Starts(), before_ + 1);
     git_repository *repository = nullptr;
     EXPECT_EQ(git_repository_open(&repository, makeRepository().path().c_str()), 0);
     git_repository_free(repository);
     second.reset();
-    EXPECT_EQ(countStarts(), before_);
+    EXPECT_EQ(countLibGit2Starts(), before_);
 }
 
 TEST_F(LibGit2GuardTest, IsNeitherCopiedNorMoved)
@@ -81,20 +75,20 @@ TEST_F(LibGit2GuardTest, MayEndOnAnotherThread)
 {
     auto guard = std::make_unique<LibGit2Guard>();
     std::thread([&guard] { guard.reset(); }).join();
-    EXPECT_EQ(countStarts(), before_);
+    EXPECT_EQ(countLibGit2Starts(), before_);
 }
 
 TEST_F(LibGit2GuardTest, StandsInAnAdapterForTheAdaptersLife)
 {
     const auto interactor = std::make_shared<vclink::test::TestInteractor>();
     auto adapter = GitAdapterFactory().createAdapterFor(asPath(folder().path()), interactor);
-    EXPECT_EQ(countStarts(), before_ + 1);
+    EXPECT_EQ(countLibGit2Starts(), before_ + 1);
     auto second = GitAdapterFactory().createAdapterFor(asPath(folder().path()), interactor);
-    EXPECT_EQ(countStarts(), before_ + 2);
+    EXPECT_EQ(countLibGit2Starts(), before_ + 2);
     adapter.reset();
-    EXPECT_EQ(countStarts(), before_ + 1);
+    EXPECT_EQ(countLibGit2Starts(), before_ + 1);
     second.reset();
-    EXPECT_EQ(countStarts(), before_);
+    EXPECT_EQ(countLibGit2Starts(), before_);
 }
 
 TEST_F(LibGit2GuardTest, StandsInAProbeForTheCallOnly)
@@ -103,11 +97,11 @@ TEST_F(LibGit2GuardTest, StandsInAProbeForTheCallOnly)
     repository.write("broken/.git", "neither a folder nor a link");
     const GitAdapterFactory factory;
     EXPECT_TRUE(factory.isAdapterFor(asPath(repository.path())));
-    EXPECT_EQ(countStarts(), before_);
+    EXPECT_EQ(countLibGit2Starts(), before_);
     EXPECT_FALSE(factory.isAdapterFor(asPath(folder().path())));
-    EXPECT_EQ(countStarts(), before_);
+    EXPECT_EQ(countLibGit2Starts(), before_);
     EXPECT_THROW(factory.isAdapterFor(asPath(repository / "broken")), LibGit2Exception);
-    EXPECT_EQ(countStarts(), before_);
+    EXPECT_EQ(countLibGit2Starts(), before_);
 }
 
 TEST_F(LibGit2GuardTest, LetsAnExceptionOfAProbeTellItsTextAfterTheEnd)
@@ -121,7 +115,7 @@ TEST_F(LibGit2GuardTest, LetsAnExceptionOfAProbeTellItsTextAfterTheEnd)
     }
     catch (const LibGit2Exception &exception)
     {
-        EXPECT_EQ(countStarts(), before_);
+        EXPECT_EQ(countLibGit2Starts(), before_);
         const std::string text = vclink::test::asUtf8(exception.GetUnicodeMessageTxt());
         EXPECT_NE(text.find("malformed"), std::string::npos) << text;
     }
@@ -131,9 +125,9 @@ TEST_F(LibGit2GuardTest, StandsInAGeneratorForItsLife)
 {
     const auto interactor = std::make_shared<vclink::test::TestInteractor>();
     auto generator = GitAdapterFactory().createWorkingCopyGenerator(interactor);
-    EXPECT_EQ(countStarts(), before_ + 1);
+    EXPECT_EQ(countLibGit2Starts(), before_ + 1);
     generator.reset();
-    EXPECT_EQ(countStarts(), before_);
+    EXPECT_EQ(countLibGit2Starts(), before_);
 }
 
 TEST_F(LibGit2GuardTest, KeepsAnAdapterWorkingWhenAProbeHasEnded)

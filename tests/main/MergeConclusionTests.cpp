@@ -22,7 +22,7 @@ using vclink::test::linesOf;
 using vclink::test::NothingChanges;
 using vclink::test::stateOf;
 
-const std::string missingId = "1234567890123456789012345678901234567890";
+const std::string missingMergeHead = "1234567890123456789012345678901234567890";
 
 /// A commit that ends a merge which is under way, and what becomes of the conflicts in it.
 class MergeConclusion : public vclink::test::CommitTest
@@ -243,17 +243,17 @@ TEST_F(MergeConclusion, FailsWithAMergeHeadThatIsCutShort)
 TEST_F(MergeConclusion, FailsWithAMergeHeadWhoseCommitIsMissing)
 {
     beginMerge({"file"});
-    repository_.write(".git/MERGE_HEAD", missingId + '\n');
-    expectFailure(
-        {GIT_ENOTFOUND, GIT_ERROR_ODB, "object not found - no match for id (" + missingId + ")"});
+    repository_.write(".git/MERGE_HEAD", missingMergeHead + '\n');
+    expectFailure({GIT_ENOTFOUND, GIT_ERROR_ODB,
+                   "object not found - no match for id (" + missingMergeHead + ")"});
 }
 
 TEST_F(MergeConclusion, FailsWithAMissingSecondMergeHead)
 {
     beginMerge({"file"});
-    repository_.write(".git/MERGE_HEAD", idOf("theirs") + '\n' + missingId + '\n');
-    expectFailure(
-        {GIT_ENOTFOUND, GIT_ERROR_ODB, "object not found - no match for id (" + missingId + ")"});
+    repository_.write(".git/MERGE_HEAD", idOf("theirs") + '\n' + missingMergeHead + '\n');
+    expectFailure({GIT_ENOTFOUND, GIT_ERROR_ODB,
+                   "object not found - no match for id (" + missingMergeHead + ")"});
 }
 
 TEST_F(MergeConclusion, FailsWithAMergeHeadThatIsNoCommit)

@@ -21,8 +21,8 @@ using testing::ElementsAre;
 using vclink::test::LogCapture;
 using vclink::test::LogRecord;
 
-const std::string signature = "virtual void vclink::git::BasicBranchManager::merge("
-                              "vclink::git::BranchManager::BranchName)";
+const std::string mergeSignature = "virtual void vclink::git::BasicBranchManager::merge("
+                                   "vclink::git::BranchManager::BranchName)";
 constexpr unsigned tracing =
     git::SeverityScopeEntry | git::SeverityScopeExit | git::SeverityParameter;
 
@@ -181,7 +181,7 @@ TEST_F(MergeLog, TracesTheMergeWithItsParameter)
 {
     const LogCapture log(tracing);
     merge("main");
-    EXPECT_THAT(log.messages(), ElementsAre(signature, " branchName=main", signature));
+    EXPECT_THAT(log.messages(), ElementsAre(mergeSignature, " branchName=main", mergeSignature));
     EXPECT_EQ(log.records()[0].severity, git::SeverityScopeEntry);
     EXPECT_EQ(log.records()[1].severity, git::SeverityParameter);
     EXPECT_EQ(log.records()[2].severity, git::SeverityScopeExit);
@@ -194,9 +194,9 @@ TEST_F(MergeLog, TracesAMergeThatFails)
     EXPECT_ANY_THROW(merge("topic"));
     const auto messages = log.messages();
     ASSERT_GE(messages.size(), 3U);
-    EXPECT_EQ(messages[0], signature);
+    EXPECT_EQ(messages[0], mergeSignature);
     EXPECT_EQ(messages[1], " branchName=topic");
-    EXPECT_EQ(messages.back(), signature + " [throw]");
+    EXPECT_EQ(messages.back(), mergeSignature + " [throw]");
 }
 
 } // namespace

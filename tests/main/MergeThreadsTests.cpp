@@ -33,7 +33,7 @@ using vclink::test::GitRepository;
 using vclink::test::LibGit2Session;
 using vclink::test::TestInteractor;
 
-constexpr int rounds = 10;
+constexpr int mergeRounds = 10;
 
 /// Where two threads wait for each other.
 class Meeting
@@ -149,7 +149,7 @@ class MergeThreads : public vclink::test::GitTest
 
 TEST_F(MergeThreads, RunTheirCommandsAtOnceWhileTheGuardsOfBothStand)
 {
-    for (int round = 0; round < rounds; ++round)
+    for (int round = 0; round < mergeRounds; ++round)
     {
         EXPECT_EQ(mergeInBoth(), (std::array<std::string, 2>{}));
         for (auto &repository : repositories_)
@@ -162,7 +162,7 @@ TEST_F(MergeThreads, FailEachForItselfWithAnExceptionFromWithinLibGit2)
     const std::string beginning = "\"topic\" could not be merged into the current branch.\n";
     isCancelled_ = {true, false};
     repositories_[1].git({"config", "merge.tool.driver", "no-such-command %A"});
-    for (int round = 0; round < rounds; ++round)
+    for (int round = 0; round < mergeRounds; ++round)
     {
         EXPECT_EQ(mergeInBoth(), (std::array<std::string, 2>{
                                      beginning + "The operation was cancelled.",

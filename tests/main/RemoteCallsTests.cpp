@@ -31,7 +31,7 @@ using vclink::test::LibGit2Failure;
 using vclink::test::libGit2FailureOf;
 using Names = std::vector<std::string>;
 
-const LibGit2Failure injected{-31, GIT_ERROR_OS, "injected"};
+const LibGit2Failure injectedFailure{-31, GIT_ERROR_OS, "injected"};
 
 const Names ofFetch{"git_repository_open_ext",   "git_remote_lookup",
                     "git_fetch_options_init",    "git_proxy_options_init",
@@ -125,8 +125,8 @@ TEST_F(RemoteCalls, ThatFailRaiseTheirErrorAndLeaveNoHandle)
             if (name == "git_remote_free" || name == "git_repository_free")
                 continue;
             calls_.clear();
-            calls_.fail({{name, injected.code}});
-            EXPECT_EQ(libGit2FailureOf(operation.run), injected) << name;
+            calls_.fail({{name, injectedFailure.code}});
+            EXPECT_EQ(libGit2FailureOf(operation.run), injectedFailure) << name;
             EXPECT_EQ(calls_.steps(), untilFailure(operation.names, name)) << name;
             EXPECT_THAT(calls_.openHandles(), IsEmpty()) << name;
         }
@@ -286,7 +286,7 @@ TEST_F(RemoteCalls, OfAListingThatFailsTellTheFailure)
 {
     calls_.fail({{"git_remote_ls", -31}});
     const vclink::test::LogCapture log(git::SeverityDiagnostic);
-    EXPECT_EQ(libGit2FailureOf([this] { remote().getRemoteHeads(); }), injected);
+    EXPECT_EQ(libGit2FailureOf([this] { remote().getRemoteHeads(); }), injectedFailure);
     EXPECT_THAT(log.messages(), ElementsAre("Throwing error injected (-31)"));
 }
 

@@ -12,6 +12,7 @@
 
 #include "StagingTest.hpp"
 #include "TestOptionsFactory.hpp"
+#include "callNames.hpp"
 #include "support/libgit2/LibGit2Recorder.hpp"
 #include "util/pathspecEscape.hpp"
 #include "vclink/util/exception/CancelledOperationException.hpp"
@@ -28,23 +29,17 @@ using vclink::test::Failure;
 using vclink::test::failureOf;
 using vclink::test::LibGit2Recorder;
 using vclink::test::NothingChanges;
+using vclink::test::ofTheQuery;
+using vclink::test::operator+;
 using Names = std::vector<std::string>;
 
-Names operator+(Names left, const Names &right)
-{
-    left.insert(left.end(), right.begin(), right.end());
-    return left;
-}
-
-const Names ofTheQuery{"git_status_options_init", "git_repository_open_ext",
-                       "git_status_foreach_ext", "git_repository_free"};
 /// The index is read before, to be sure of it.
-const Names reset =
+const Names ofTheReset =
     ofTheQuery + Names{"git_repository_open_ext", "git_revparse_single", "git_repository_index",
                        "git_reset_default", "git_index_free"};
-const Names makingOptions{"makeCheckoutOptions", "git_checkout_options_init"};
-const Names checkout{"git_checkout_index"};
-const Names released{"git_object_free", "git_repository_free"};
+const Names ofTheOptions{"makeCheckoutOptions", "git_checkout_options_init"};
+const Names ofTheCheckout{"git_checkout_index"};
+const Names ofTheRelease{"git_object_free", "git_repository_free"};
 
 /// The calls of libgit2 that a revert makes.
 class RevertCalls : public vclink::test::StagingTest
@@ -99,14 +94,14 @@ class RevertCalls : public vclink::test::StagingTest
 TEST_F(RevertCalls, ResetTheIndexAndCheckItOut)
 {
     revert({"file"});
-    EXPECT_EQ(calls_.steps(), reset + makingOptions + checkout + released);
+    EXPECT_EQ(calls_.steps(), ofTheReset + ofTheOptions + ofTheCheckout + ofTheRelease);
     EXPECT_THAT(calls_.openHandles(), IsEmpty());
 }
 
 TEST_F(RevertCalls, AreTheSameWithoutAChange)
 {
     revert({"other"});
-    EXPECT_EQ(calls_.steps(), reset + makingOptions + checkout + released);
+    EXPECT_EQ(calls_.steps(), ofTheReset + ofTheOptions + ofTheCheckout + ofTheRelease);
 }
 
 TEST_F(RevertCalls, ResetOnceWhereFilesWereOnlyAdded)
@@ -304,14 +299,14 @@ TEST_F(FailingRevertCalls, OfTheOpeningChangeNothing)
 TEST_F(FailingRevertCalls, OfTheResetChangeNothing)
 {
     const NothingChanges nothing(repository_);
-    expectFails("git_reset_default", reset + released);
+    expectFails("git_reset_default", ofTheReset + ofTheRelease);
 }
 
 TEST_F(FailingRevertCalls, AfterTheResetLeaveItInPlace)
 {
     repository_.add({"file"});
     const auto expected = stateAfterGit({{"restore", "--staged", "."}});
-    expectFails("git_checkout_options_init", reset + makingOptions + released);
+    expectFails("git_checkout_options_init", ofTheReset + ofTheOptions + ofTheRelease);
     EXPECT_EQ(stateOf(repository_), expected);
 }
 
@@ -319,7 +314,7 @@ TEST_F(FailingRevertCalls, OfTheCheckoutLeaveTheResetInPlace)
 {
     repository_.add({"file"});
     const auto expected = stateAfterGit({{"restore", "--staged", "."}});
-    expectFails("git_checkout_index", reset + makingOptions + checkout + released);
+    expectFails("git_checkout_index", ofTheReset + ofTheOptions + ofTheCheckout + ofTheRelease);
     EXPECT_EQ(stateOf(repository_), expected);
 }
 

@@ -8,6 +8,7 @@
 #include <gtest/gtest.h>
 
 #include "StagingTest.hpp"
+#include "callNames.hpp"
 #include "support/libgit2/LibGit2Recorder.hpp"
 #include "util/pathspecEscape.hpp"
 
@@ -23,23 +24,17 @@ using vclink::test::Failure;
 using vclink::test::failureOf;
 using vclink::test::LibGit2Recorder;
 using vclink::test::NothingChanges;
+using vclink::test::ofTheQuery;
+using vclink::test::operator+;
 using Names = std::vector<std::string>;
 
-const Names ofTheQuery{"git_status_options_init", "git_repository_open_ext",
-                       "git_status_foreach_ext", "git_repository_free"};
 const Names ofTheAddition{"git_repository_open_ext", "git_repository_index", "git_index_add_all",
                           "git_index_write",         "git_index_free",       "git_repository_free"};
 const Names ofTheRemoval{"git_repository_open_ext", "git_repository_index", "git_index_remove_all",
                          "git_index_write",         "git_index_free",       "git_repository_free"};
 
-Names operator+(Names left, const Names &right)
-{
-    left.insert(left.end(), right.begin(), right.end());
-    return left;
-}
-
 /// What an index call was given.
-struct Asked
+struct AskedOfIndex
 {
     Names pathspec;
     unsigned flags = 99;
@@ -86,8 +81,8 @@ class StagingCalls : public vclink::test::StagingTest
 
     std::unique_ptr<vclink::git::GitAdapter> adapter_ = makeAdapter(repository_.path());
     LibGit2Recorder calls_;
-    std::vector<Asked> additions_;
-    std::vector<Asked> removals_;
+    std::vector<AskedOfIndex> additions_;
+    std::vector<AskedOfIndex> removals_;
 };
 
 TEST_F(StagingCalls, OfAnAdditionFollowThoseOfTheQuery)
@@ -169,7 +164,7 @@ TEST_F(StagingCalls, AcceptEveryPath)
 {
     add({"new"});
     remove({"file"});
-    for (const Asked &asked : {additions_.at(0), removals_.at(0)})
+    for (const AskedOfIndex &asked : {additions_.at(0), removals_.at(0)})
     {
         ASSERT_NE(asked.callback, nullptr);
         EXPECT_EQ(asked.callback("path", "pattern", asked.payload), 0);
@@ -202,7 +197,7 @@ TEST_F(StagingCalls, AreThoseOfTheQueryAloneWhereAFileIsRefused)
 }
 
 /// One of the calls of staging that fail, and those that are made nevertheless.
-struct FailingCall
+struct FailingIndexCall
 {
     std::string name;
     Names expected;
@@ -213,7 +208,7 @@ struct FailingCall
 class FailingStagingCalls : public StagingCalls
 {
   protected:
-    void expectFails(const FailingCall &failing, const std::function<void()> &operation)
+    void expectFails(const FailingIndexCall &failing, const std::function<void()> &operation)
     {
         SCOPED_TRACE(failing.name);
         calls_.clear();
@@ -231,7 +226,7 @@ TEST_F(FailingStagingCalls, EndAnAdditionAndReleaseTheHandles)
     const Names index = open + Names{"git_repository_index"};
     const Names addAll = index + Names{"git_index_add_all"};
     const Names released{"git_index_free", "git_repository_free"};
-    const std::vector<FailingCall> failing{
+    const std::vector<FailingIndexCall> failing{
         {"git_repository_open_ext", open},
         {"git_repository_index", index + Names{"git_repository_free"}},
         {"git_index_add_all", addAll + released},
@@ -240,7 +235,7 @@ TEST_F(FailingStagingCalls, EndAnAdditionAndReleaseTheHandles)
         expectFails(call, [this] { markResolved("new"); });
     for (const auto &call : {failing[1], failing[2], failing[3]})
     {
-        const FailingCall afterTheQuery{call.name, ofTheQuery + call.expected};
+        const FailingIndexCall afterTheQuery{call.name, ofTheQuery + call.expected};
         expectFails(afterTheQuery, [this] { add({"new"}); });
     }
 }
@@ -251,7 +246,7 @@ TEST_F(FailingStagingCalls, EndARemovalAndReleaseTheHandles)
     const Names index = open + Names{"git_repository_index"};
     const Names removeAll = index + Names{"git_index_remove_all"};
     const Names released{"git_index_free", "git_repository_free"};
-    const std::vector<FailingCall> failing{
+    const std::vector<FailingIndexCall> failing{
         {"git_repository_open_ext", open},
         {"git_repository_index", index + Names{"git_repository_free"}},
         {"git_index_remove_all", removeAll + released},
@@ -260,23 +255,23 @@ TEST_F(FailingStagingCalls, EndARemovalAndReleaseTheHandles)
         expectFails(call, [this] { markResolved("missing"); });
     for (const auto &call : {failing[1], failing[2], failing[3]})
     {
-        const FailingCall afterTheQuery{call.name, ofTheQuery + call.expected};
+        const FailingIndexCall afterTheQuery{call.name, ofTheQuery + call.expected};
         expectFails(afterTheQuery, [this] { remove({"file"}); });
     }
 }
 
 TEST_F(FailingStagingCalls, OfTheSecondOpeningEndAnOperation)
 {
-    const FailingCall second{"git_repository_open_ext",
-                             ofTheQuery + Names{"git_repository_open_ext"}, 2};
+    const FailingIndexCall second{"git_repository_open_ext",
+                                  ofTheQuery + Names{"git_repository_open_ext"}, 2};
     expectFails(second, [this] { add({"new"}); });
     expectFails(second, [this] { remove({"file"}); });
 }
 
 TEST_F(FailingStagingCalls, OfTheQueryEndAnOperationToo)
 {
-    const FailingCall open{"git_repository_open_ext",
-                           {"git_status_options_init", "git_repository_open_ext"}};
+    const FailingIndexCall open{"git_repository_open_ext",
+                                {"git_status_options_init", "git_repository_open_ext"}};
     expectFails(open, [this] { add({"new"}); });
     expectFails(open, [this] { remove({"file"}); });
 }

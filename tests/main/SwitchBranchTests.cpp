@@ -29,7 +29,7 @@ using vclink::test::NothingChanges;
 using vclink::test::stateOf;
 using vclink::util::exception::CancelledOperationException;
 
-const std::string signature =
+const std::string switchSignature =
     "virtual void vclink::git::BasicBranchManager::switchBranch(const BranchName&)";
 
 class SwitchBranch : public vclink::test::SwitchBranchTest
@@ -231,9 +231,9 @@ TEST_F(SwitchBranch, IsTracedWithItsParameter)
     switchTo("topic");
     const auto messages = log.messages();
     ASSERT_GE(messages.size(), 3U);
-    EXPECT_EQ(messages[0], signature);
+    EXPECT_EQ(messages[0], switchSignature);
     EXPECT_EQ(messages[1], " branch=topic");
-    EXPECT_EQ(messages.back(), signature);
+    EXPECT_EQ(messages.back(), switchSignature);
     EXPECT_EQ(log.records()[0].severity, git::SeverityScopeEntry);
     EXPECT_EQ(log.records()[1].severity, git::SeverityParameter);
     EXPECT_EQ(log.records().back().severity, git::SeverityScopeExit);
@@ -246,9 +246,9 @@ TEST_F(SwitchBranch, IsTracedBeforeTheRepositoryIsOpened)
     EXPECT_THROW(switchTo("topic"), git::LibGit2Exception);
     const auto messages = log.messages();
     ASSERT_GE(messages.size(), 3U);
-    EXPECT_EQ(messages[0], signature);
+    EXPECT_EQ(messages[0], switchSignature);
     EXPECT_EQ(messages[1], " branch=topic");
-    EXPECT_EQ(messages.back(), signature + " [throw]");
+    EXPECT_EQ(messages.back(), switchSignature + " [throw]");
 }
 
 TEST_F(SwitchBranch, LogsNothingOfItsOwnBesides)

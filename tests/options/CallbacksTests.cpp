@@ -19,6 +19,7 @@
 #include "error/CoreFilter.hpp"
 #include "support/LogCapture.hpp"
 #include "support/diagnosticText.hpp"
+#include "support/isRecord.hpp"
 #include "vclink/util/exception/CancelledOperationException.hpp"
 
 namespace vclink::git
@@ -28,8 +29,8 @@ namespace
 
 using test::CoreFilter;
 using test::diagnosticTextOf;
+using test::isRecord;
 using test::LogCapture;
-using test::LogRecord;
 using testing::ElementsAre;
 using testing::HasSubstr;
 using testing::IsEmpty;
@@ -62,8 +63,8 @@ class Target
 using AnswerCallback = int (*)(const char *, unsigned, void *);
 using NoticeCallback = void (*)(const char *, std::size_t, void *);
 
-constexpr AnswerCallback answer = makeCallback<&Target::answer, AnswerCallback>();
-constexpr NoticeCallback notice = makeCallback<&Target::notice, NoticeCallback>();
+constexpr AnswerCallback answerCallback = makeCallback<&Target::answer, AnswerCallback>();
+constexpr NoticeCallback noticeCallback = makeCallback<&Target::notice, NoticeCallback>();
 
 using AnswerLambda = decltype(detail::makeCallbackImpl<&Target::answer>(
     std::tuple<const char *, unsigned, void *>()));
@@ -81,12 +82,6 @@ struct BoostOnly : virtual boost::exception
 {
 };
 
-auto isRecord(unsigned severity, const std::string &message)
-{
-    return testing::AllOf(testing::Field(&LogRecord::severity, severity),
-                          testing::Field(&LogRecord::message, message));
-}
-
 class Callback : public testing::Test
 {
   protected:
@@ -103,7 +98,7 @@ class Callback : public testing::Test
     template <class Exception> int answerThrowing(const Exception &exception)
     {
         target.body = [&exception]() -> int { throw exception; };
-        return answer("path", 1, &target);
+        return answerCallback("path", 1, &target);
     }
 
     Target target;
@@ -111,8 +106,8 @@ class Callback : public testing::Test
 
 TEST_F(Callback, CallsTheMemberWithItsArgumentsInOrder)
 {
-    answer("folder/file", 17, &target);
-    notice("other", 99, &target);
+    answerCallback("folder/file", 17, &target);
+    noticeCallback("other", 99, &target);
     EXPECT_THAT(target.received,
                 ElementsAre(std::make_pair("folder/file", 17u), std::make_pair("other", 99u)));
 }
@@ -122,7 +117,7 @@ TEST_F(Callback, GivesTheMembersResultUnchanged)
     for (const int result : {0, 1, -1, -7, -30, 42, INT_MIN, INT_MAX})
     {
         target.body = [result] { return result; };
-        EXPECT_EQ(answer("path", 1, &target), result);
+        EXPECT_EQ(answerCallback("path", 1, &target), result);
         EXPECT_EQ(pendingCallbackException(), nullptr) << result;
     }
 }
@@ -151,7 +146,7 @@ TEST_F(Callback, ParksTheVeryObjectThatWasThrown)
 {
     const std::exception_ptr thrown = std::make_exception_ptr(std::runtime_error("failed"));
     target.body = [&thrown]() -> int { std::rethrow_exception(thrown); };
-    answer("path", 1, &target);
+    answerCallback("path", 1, &target);
     EXPECT_EQ(pendingCallbackException(), thrown);
 }
 
@@ -173,7 +168,7 @@ TEST_F(Callback, KeepsAParkedExceptionThroughALaterSuccess)
 {
     answerThrowing(1);
     target.body = [] { return 0; };
-    EXPECT_EQ(answer("path", 1, &target), 0);
+    EXPECT_EQ(answerCallback("path", 1, &target), 0);
     EXPECT_NE(pendingCallbackException(), nullptr);
 }
 
@@ -181,7 +176,7 @@ TEST_F(Callback, WithoutAResultReportsAndStoresNothing)
 {
     target.body = []() -> int { throw std::runtime_error("failed"); };
     const LogCapture log(SeverityException | SeverityStackTrace);
-    notice("path", 1, &target);
+    noticeCallback("path", 1, &target);
     EXPECT_EQ(pendingCallbackException(), nullptr);
     const auto records = log.records();
     ASSERT_EQ(records.size(), 2u);
@@ -195,7 +190,7 @@ TEST_F(Callback, WithoutAResultLeavesAParkedExceptionAlone)
     answerThrowing(1);
     const std::exception_ptr parked = pendingCallbackException();
     target.body = []() -> int { throw 2; };
-    notice("path", 1, &target);
+    noticeCallback("path", 1, &target);
     EXPECT_EQ(pendingCallbackException(), parked);
 }
 
@@ -206,7 +201,7 @@ template <class Exception> void expectReports(const Exception &exception)
     Target target;
     target.body = [&exception]() -> int { throw exception; };
     const LogCapture log(SeverityException | SeverityStackTrace);
-    answer("path", 1, &target);
+    answerCallback("path", 1, &target);
     const auto records = log.records();
     ASSERT_EQ(records.size(), 2u);
     EXPECT_THAT(records[0], isRecord(0x10, expected));
@@ -259,7 +254,7 @@ constexpr const char *memberInSignature = "Target::answer";
 
 TEST_F(Callback, TracesUnderASignatureThatNamesTheMember)
 {
-    const std::string text = tracedAs([this] { answer("path", 1, &target); });
+    const std::string text = tracedAs([this] { answerCallback("path", 1, &target); });
     EXPECT_THAT(text, HasSubstr("vclink::git::detail::makeCallbackImpl"));
     EXPECT_THAT(text, HasSubstr(memberInSignature));
 }
@@ -267,8 +262,8 @@ TEST_F(Callback, TracesUnderASignatureThatNamesTheMember)
 TEST_F(Callback, TracesEachInstanceUnderItsOwnSignature)
 {
     const auto other = makeCallback<&Target::otherAnswer, int (*)(unsigned, void *)>();
-    const std::string one = tracedAs([this] { answer("path", 1, &target); });
-    const std::string two = tracedAs([this] { notice("path", 1, &target); });
+    const std::string one = tracedAs([this] { answerCallback("path", 1, &target); });
+    const std::string two = tracedAs([this] { noticeCallback("path", 1, &target); });
     const std::string three = tracedAs([this, other] { other(1, &target); });
     EXPECT_NE(one, two);
     EXPECT_NE(one, three);
@@ -277,7 +272,7 @@ TEST_F(Callback, TracesEachInstanceUnderItsOwnSignature)
 
 TEST_F(Callback, TracesTheSameWhenTheMemberThrows)
 {
-    const std::string returning = tracedAs([this] { answer("path", 1, &target); });
+    const std::string returning = tracedAs([this] { answerCallback("path", 1, &target); });
     EXPECT_EQ(tracedAs([this] { answerThrowing(1); }), returning);
     EXPECT_EQ(logger().scope_depth(), 0);
 }
@@ -303,7 +298,7 @@ TEST_F(Callback, CallsTheMemberInsideItsScope)
         EXPECT_EQ(logger().scope_depth(), 1);
         return 0;
     };
-    answer("path", 1, &target);
+    answerCallback("path", 1, &target);
     EXPECT_EQ(logger().scope_depth(), 0);
 }
 
@@ -331,7 +326,7 @@ TEST_F(CallbackDeathTest, EndsTheProcessWhenTheTraceOfItsEntryFails)
     EXPECT_DEATH(
         {
             const CoreFilter filter = failAt(SeverityScopeEntry);
-            answer("path", 1, &target);
+            answerCallback("path", 1, &target);
         },
         "terminate called.*logic_error");
 }
@@ -342,7 +337,7 @@ TEST_F(CallbackDeathTest, EndsTheProcessWhenTheTraceOfItsExitFails)
     EXPECT_DEATH(
         {
             const CoreFilter filter = failAt(SeverityScopeExit);
-            answer("path", 1, &target);
+            answerCallback("path", 1, &target);
         },
         "terminate called.*logic_error");
 }
@@ -360,7 +355,7 @@ TEST_F(CallbackDeathTest, EndsTheProcessWhenTheReportFails)
     EXPECT_DEATH(
         {
             const CoreFilter filter = failAt(SeverityStackTrace);
-            notice("path", 1, &target);
+            noticeCallback("path", 1, &target);
         },
         "terminate called.*logic_error");
 }

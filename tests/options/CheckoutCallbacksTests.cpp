@@ -17,6 +17,7 @@
 #include "support/LocaleOfTheProcess.hpp"
 #include "support/LogCapture.hpp"
 #include "support/TestInteractor.hpp"
+#include "support/isRecord.hpp"
 #include "support/text.hpp"
 #include "vclink/util/exception/CancelledOperationException.hpp"
 
@@ -26,9 +27,9 @@ namespace
 {
 
 using test::CoreFilter;
+using test::isRecord;
 using test::LocaleOfTheProcess;
 using test::LogCapture;
-using test::LogRecord;
 using test::ProgressCall;
 using test::TestInteractor;
 using testing::ElementsAre;
@@ -37,19 +38,13 @@ using vclink::util::exception::CancelledOperationException;
 
 constexpr std::size_t greatest = std::numeric_limits<std::size_t>::max();
 
-auto isRecord(unsigned severity, const std::string &message)
-{
-    return testing::AllOf(testing::Field(&LogRecord::severity, severity),
-                          testing::Field(&LogRecord::message, message));
-}
-
 ProgressCall message(const ustring &text)
 {
     return text;
 }
 
 /// An application whose progress display can be exchanged or lost.
-class Interactor : public TestInteractor
+class DisplayInteractor : public TestInteractor
 {
   public:
     ProgressReporter *getProgressReporter() override
@@ -83,7 +78,7 @@ class CheckoutCallbacksTest : public testing::Test
         return interactor_.progress.calls;
     }
 
-    Interactor interactor_;
+    DisplayInteractor interactor_;
     CheckoutCallbacks callbacks_{interactor_};
     LocaleOfTheProcess english_{"C"};
 };

@@ -15,6 +15,7 @@
 #include "error/errorUtil/callbackException.hpp"
 #include "error/errorUtil/setGitError.hpp"
 #include "error/logging/severity.hpp"
+#include "options/bytesOf.hpp"
 #include "options/gitRecords.hpp"
 #include "support/LogCapture.hpp"
 #include "support/TestInteractor.hpp"
@@ -27,6 +28,7 @@ namespace vclink::git
 namespace
 {
 
+using test::bytesOf;
 using test::CoreFilter;
 using test::HermeticLibGit2;
 using test::LogCapture;
@@ -35,13 +37,6 @@ using testing::ElementsAre;
 using testing::HasSubstr;
 using testing::StartsWith;
 using vclink::util::exception::CancelledOperationException;
-
-std::vector<unsigned char> bytesOf(const git_checkout_options &record)
-{
-    std::vector<unsigned char> bytes(sizeof(record));
-    std::memcpy(bytes.data(), &record, sizeof(record));
-    return bytes;
-}
 
 class ToGitCheckoutOptions : public testing::Test
 {

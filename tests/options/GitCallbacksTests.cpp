@@ -72,10 +72,10 @@ static_assert(
     std::is_same_v<decltype(makeDefaultGitCallbacks(nullptr)), std::unique_ptr<GitCallbacks>>);
 
 /// An application that notes its end, and how often it is asked for its source of cancellation.
-class Interactor : public test::TestInteractor
+class CountingInteractor : public test::TestInteractor
 {
   public:
-    ~Interactor() override
+    ~CountingInteractor() override
     {
         events.push_back({"interactor gone", this});
     }
@@ -115,7 +115,7 @@ TEST_F(GitCallbacksTest, HasItsSlotsInOrder)
 
 TEST_F(GitCallbacksTest, HoldsItsSetsByValueInOrder)
 {
-    const auto callbacks = makeDefaultGitCallbacks(std::make_shared<Interactor>());
+    const auto callbacks = makeDefaultGitCallbacks(std::make_shared<CountingInteractor>());
     const auto remote = offsetIn(*callbacks, callbacks->remoteCallbacks());
     const auto reserved = offsetIn(*callbacks, callbacks->reservedCallbacks());
     const auto checkout = offsetIn(*callbacks, callbacks->checkoutCallbacks());
@@ -129,14 +129,14 @@ TEST_F(GitCallbacksTest, HoldsItsSetsByValueInOrder)
 
 TEST_F(GitCallbacksTest, GivesTheSameSetsEachTime)
 {
-    const auto callbacks = makeDefaultGitCallbacks(std::make_shared<Interactor>());
+    const auto callbacks = makeDefaultGitCallbacks(std::make_shared<CountingInteractor>());
     EXPECT_EQ(&callbacks->remoteCallbacks(), &callbacks->remoteCallbacks());
     EXPECT_EQ(&callbacks->checkoutCallbacks(), &callbacks->checkoutCallbacks());
 }
 
 TEST_F(GitCallbacksTest, TakesOneShareOfTheInteractorAndReleasesIt)
 {
-    auto interactor = std::make_shared<Interactor>();
+    auto interactor = std::make_shared<CountingInteractor>();
     auto callbacks = makeDefaultGitCallbacks(interactor);
     EXPECT_EQ(interactor.use_count(), 2);
     callbacks.reset();
@@ -147,7 +147,7 @@ TEST_F(GitCallbacksTest, TakesOneShareOfTheInteractorAndReleasesIt)
 
 TEST_F(GitCallbacksTest, BeginsEachSetWithTheInteractor)
 {
-    const auto interactor = std::make_shared<Interactor>();
+    const auto interactor = std::make_shared<CountingInteractor>();
     const ApplicationInteractor *const expected = interactor.get();
     const auto callbacks = makeDefaultGitCallbacks(interactor);
     const void *const sets[] = {&callbacks->remoteCallbacks(), &callbacks->reservedCallbacks(),
@@ -162,7 +162,7 @@ TEST_F(GitCallbacksTest, BeginsEachSetWithTheInteractor)
 
 TEST_F(GitCallbacksTest, ConnectsItsPollersWhenItIsMade)
 {
-    const auto interactor = std::make_shared<Interactor>();
+    const auto interactor = std::make_shared<CountingInteractor>();
     const auto callbacks = makeDefaultGitCallbacks(interactor);
     EXPECT_EQ(interactor->asked, 2);
     ASSERT_EQ(events.size(), 2u);
@@ -173,7 +173,7 @@ TEST_F(GitCallbacksTest, ConnectsItsPollersWhenItIsMade)
 
 TEST_F(GitCallbacksTest, DisconnectsTheCheckoutsPollerFirstAndReleasesTheInteractorLast)
 {
-    auto callbacks = makeDefaultGitCallbacks(std::make_shared<Interactor>());
+    auto callbacks = makeDefaultGitCallbacks(std::make_shared<CountingInteractor>());
     const void *const remote = &callbacks->remoteCallbacks();
     const void *const checkout = &callbacks->checkoutCallbacks();
     events.clear();
@@ -194,7 +194,7 @@ template <class Set> bool pollSees(Set &set)
 
 TEST_F(GitCallbacksTest, RemembersARequestInEachSetByItself)
 {
-    const auto interactor = std::make_shared<Interactor>();
+    const auto interactor = std::make_shared<CountingInteractor>();
     const auto callbacks = makeDefaultGitCallbacks(interactor);
     interactor->cancel();
     EXPECT_TRUE(pollSees(callbacks->remoteCallbacks()));

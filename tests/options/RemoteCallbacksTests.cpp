@@ -18,6 +18,7 @@
 #include "error/logging/severity.hpp"
 #include "support/LogCapture.hpp"
 #include "support/TestInteractor.hpp"
+#include "support/isRecord.hpp"
 #include "vclink/util/exception/CancelledOperationException.hpp"
 
 namespace vclink::git
@@ -26,19 +27,13 @@ namespace
 {
 
 using test::CoreFilter;
+using test::isRecord;
 using test::LogCapture;
-using test::LogRecord;
 using testing::ElementsAre;
 using testing::IsEmpty;
 using vclink::util::exception::CancelledOperationException;
 
-constexpr unsigned greatest = std::numeric_limits<unsigned>::max();
-
-auto isRecord(unsigned severity, const std::string &message)
-{
-    return testing::AllOf(testing::Field(&LogRecord::severity, severity),
-                          testing::Field(&LogRecord::message, message));
-}
+constexpr unsigned greatestCount = std::numeric_limits<unsigned>::max();
 
 /// An address that can't be read.
 template <class Object> Object *nowhere()
@@ -151,7 +146,8 @@ TEST_F(TransferProgress, TellsObjectsAndBytesBackToBack)
     const LogCapture log;
     const git_indexer_progress stats = makeStats(100, 2048);
     EXPECT_EQ(callbacks_.transferProgress(&stats), 0);
-    const git_indexer_progress most = makeStats(greatest, std::numeric_limits<std::size_t>::max());
+    const git_indexer_progress most =
+        makeStats(greatestCount, std::numeric_limits<std::size_t>::max());
     EXPECT_EQ(callbacks_.transferProgress(&most), 0);
     EXPECT_THAT(
         log.records(),
@@ -199,7 +195,7 @@ TEST_F(RemoteCallbacksTest, TellTheirArgumentsInOneRecordEach)
     callbacks_.completion(GIT_REMOTE_COMPLETION_ERROR);
     callbacks_.updateTips("refs/heads/gr\xC3\xBC\xC3\x9F", nowhere<const git_oid>(),
                           nowhere<const git_oid>());
-    callbacks_.packProgress(1, 2, greatest);
+    callbacks_.packProgress(1, 2, greatestCount);
     callbacks_.packProgress(-1, 0, 0);
     callbacks_.pushTransferProgress(4, 5, std::numeric_limits<std::size_t>::max());
     callbacks_.pushNegotiation(nowhere<const git_push_update *>(), 3);

@@ -14,6 +14,7 @@
 #include "error/HermeticLibGit2.hpp"
 #include "error/errorUtil/callbackException.hpp"
 #include "error/logging/severity.hpp"
+#include "options/bytesOf.hpp"
 #include "options/gitRecords.hpp"
 #include "support/LogCapture.hpp"
 #include "support/TestInteractor.hpp"
@@ -27,17 +28,11 @@ namespace vclink::git
 namespace
 {
 
+using test::bytesOf;
 using test::LogCapture;
 using testing::ElementsAre;
 using testing::StartsWith;
 using vclink::util::exception::CancelledOperationException;
-
-template <class Record> std::vector<unsigned char> bytesOf(const Record &record)
-{
-    std::vector<unsigned char> bytes(sizeof(record));
-    std::memcpy(bytes.data(), &record, sizeof(record));
-    return bytes;
-}
 
 /// The record as libgit2 makes it.
 template <class Record> Record initialised(int (*function)(Record *, unsigned))

@@ -11,6 +11,7 @@
 #include <gtest/gtest.h>
 
 #include "error/HermeticLibGit2.hpp"
+#include "options/bytesOf.hpp"
 #include "support/TestInteractor.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
 
@@ -19,16 +20,10 @@ namespace vclink::git
 namespace
 {
 
+using test::bytesOf;
 using test::HermeticLibGit2;
 using test::TestInteractor;
 using testing::Each;
-
-template <class Record> std::vector<unsigned char> bytesOf(const Record &record)
-{
-    std::vector<unsigned char> bytes(sizeof(record));
-    std::memcpy(bytes.data(), &record, sizeof(record));
-    return bytes;
-}
 
 std::vector<unsigned char> bytesBeforeInit;
 unsigned versionGiven = 0;

@@ -16,48 +16,48 @@ using testing::Not;
 using testing::Pair;
 
 /// Names that a pattern, a command line or a terminal could misread.
-const std::vector<std::string> oddNames{"#notes#",
-                                        "!a",
-                                        "trailing blank ",
-                                        " leading blank",
-                                        "a[1].txt",
-                                        "[q]",
-                                        "s*r",
-                                        "?x",
-                                        "-n",
-                                        "--",
-                                        "--as-is",
-                                        "{}",
-                                        "++",
-                                        "a,b",
-                                        "new\nline",
-                                        "tab\t",
-                                        "return\r",
-                                        "escape\33[31m",
-                                        "quo\"te",
-                                        "\xC3\xBC\xC3\xB1\xC3\xAF",
-                                        "\xFF\xFE",
-                                        "cut \xE2\x82",
-                                        "folder#/!file"};
+const std::vector<std::string> oddFileNames{"#notes#",
+                                            "!a",
+                                            "trailing blank ",
+                                            " leading blank",
+                                            "a[1].txt",
+                                            "[q]",
+                                            "s*r",
+                                            "?x",
+                                            "-n",
+                                            "--",
+                                            "--as-is",
+                                            "{}",
+                                            "++",
+                                            "a,b",
+                                            "new\nline",
+                                            "tab\t",
+                                            "return\r",
+                                            "escape\33[31m",
+                                            "quo\"te",
+                                            "\xC3\xBC\xC3\xB1\xC3\xAF",
+                                            "\xFF\xFE",
+                                            "cut \xE2\x82",
+                                            "folder#/!file"};
 
 class ShellChangeOfOddNames : public ChangeTest
 {
   protected:
     ShellChangeOfOddNames()
     {
-        for (const auto &name : oddNames)
+        for (const auto &name : oddFileNames)
             repository_.write(name, name);
     }
     std::vector<std::string> named(const std::string &command) const
     {
         std::vector<std::string> arguments{command, "--"};
-        arguments.insert(arguments.end(), oddNames.begin(), oddNames.end());
+        arguments.insert(arguments.end(), oddFileNames.begin(), oddFileNames.end());
         return arguments;
     }
     std::map<std::string, std::string> all(const std::string &letters) const
     {
         std::map<std::string, std::string> expected;
-        for (const auto &name : oddNames)
+        for (const auto &name : oddFileNames)
             expected[name] = letters;
         return expected;
     }
@@ -86,7 +86,7 @@ TEST_F(ShellChangeOfOddNames, RemovesThemAll)
     succeed(named("rm"));
     const auto tracked = split(repository_.git({"ls-files", "-z"}), '\0');
     EXPECT_EQ(tracked.size(), 5U);
-    for (const auto &name : oddNames)
+    for (const auto &name : oddFileNames)
         EXPECT_EQ(repository_.read(name), name);
 }
 
@@ -105,12 +105,12 @@ TEST_F(ShellChangeOfOddNames, RemovesOneAndNoOther)
 TEST_F(ShellChangeOfOddNames, RevertsThemAll)
 {
     repository_.commitAll("odd");
-    for (const auto &name : oddNames)
+    for (const auto &name : oddFileNames)
         repository_.write(name, name + " edited");
     EXPECT_EQ(letters(), all(" M"));
     succeed(named("revert"));
     EXPECT_THAT(letters(), IsEmpty());
-    for (const auto &name : oddNames)
+    for (const auto &name : oddFileNames)
         EXPECT_EQ(repository_.read(name), name);
 }
 
@@ -120,7 +120,7 @@ TEST_F(ShellChangeOfOddNames, RevertsOneAndNoOther)
     for (const std::string name :
          {"#notes#", "!a", "trailing blank ", "-n", "\xFF\xFE", "return\r"})
     {
-        for (const auto &odd : oddNames)
+        for (const auto &odd : oddFileNames)
             // Of another size than before: git looks at whole seconds.
             repository_.write(odd, odd + " edited");
         succeed({"revert", "--", name});
@@ -132,7 +132,7 @@ TEST_F(ShellChangeOfOddNames, RevertsOneAndNoOther)
 
 TEST_F(ShellChangeOfOddNames, MarksThemAsResolved)
 {
-    for (const auto &name : oddNames)
+    for (const auto &name : oddFileNames)
         succeed({"resolved", "--", name});
     EXPECT_EQ(letters(), all("A "));
 }

@@ -17,8 +17,8 @@ class ShellFailures : public ShellTest
 };
 
 const std::string english = "vclink-shell: Git could not complete the operation: ";
-const std::string german = "vclink-shell: Git konnte den Vorgang nicht abschlie\xC3\x9F"
-                           "en: ";
+const std::string germanFailure = "vclink-shell: Git konnte den Vorgang nicht abschlie\xC3\x9F"
+                                  "en: ";
 
 TEST_F(ShellFailures, TellTheTextOfTheExceptionAndEndWithOne)
 {
@@ -35,7 +35,7 @@ TEST_F(ShellFailures, AreToldInTheLanguageThatWasAskedFor)
     const GitRepository repository = makeBrokenRepository();
     const CommandResult result = runIn(repository.path(), {"--lang", "de", "status"});
     EXPECT_EQ(result.exitStatus, 1);
-    EXPECT_THAT(result.errors, StartsWith(german));
+    EXPECT_THAT(result.errors, StartsWith(germanFailure));
     EXPECT_THAT(runIn(repository.path(), {"--lang", "ja_JP.UTF-8", "status"}).errors,
                 HasSubstr("\xE3\x82\xB3\xE3\x83\xBC\xE3\x83\x89 -1"));
     EXPECT_THAT(runIn(repository.path(), {"--lang", "xx", "status"}).errors, StartsWith(english));
@@ -52,7 +52,7 @@ TEST_F(ShellFailures, AreToldInTheLanguageOfTheEnvironmentUnlessAnotherWasAskedF
             .run()
             .errors;
     };
-    EXPECT_THAT(run({"status"}), StartsWith(german));
+    EXPECT_THAT(run({"status"}), StartsWith(germanFailure));
     EXPECT_THAT(run({"--lang", "en", "status"}), StartsWith(english));
 }
 

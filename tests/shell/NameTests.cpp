@@ -18,7 +18,7 @@ class ShellNames : public ShellTest
 };
 
 /// Names that a line, a terminal, a command line or a pattern could misread.
-const std::vector<std::string> oddNames{" leading blank",
+const std::vector<std::string> oddPaths{" leading blank",
                                         "trailing blank ",
                                         "two  blanks",
                                         "-z",
@@ -51,7 +51,7 @@ const std::vector<std::string> oddNames{" leading blank",
 TEST_F(ShellNames, GoOutByteForByteBetweenNulsAsGitWritesThem)
 {
     const GitRepository repository = makeRepository();
-    std::vector<std::string> names = oddNames;
+    std::vector<std::string> names = oddPaths;
     names.insert(names.end(),
                  {"\xFF\xFE", "cut \xE2\x82", "\xED\xA0\x80", "mixed \xC3\xBC\xFC", "back\\slash"});
     for (const auto &name : names)
@@ -70,7 +70,7 @@ TEST_F(ShellNames, GoOutByteForByteBetweenNulsAsGitWritesThem)
 TEST_F(ShellNames, ComeInAsTheyAre)
 {
     const GitRepository repository = makeRepository();
-    std::vector<std::string> names = oddNames;
+    std::vector<std::string> names = oddPaths;
     names.insert(names.end(), {"\xFF\xFE", "cut \xE2\x82", "\xED\xA0\x80", "mixed \xC3\xBC\xFC"});
     for (const auto &name : names)
         repository.write(name, "");
@@ -102,7 +102,7 @@ TEST_F(ShellNames, NeedNoDoubleDashUnlessTheyBeginWithADash)
 TEST_F(ShellNames, AreShownOnOneLineInTheWayOfGit)
 {
     const GitRepository repository = makeRepository();
-    std::vector<std::string> names = oddNames;
+    std::vector<std::string> names = oddPaths;
     names.emplace_back("back\\slash");
     for (const auto &name : names)
         repository.write(name, "");

@@ -20,4 +20,11 @@ LibGit2Session::~LibGit2Session()
     git_libgit2_shutdown();
 }
 
+int countLibGit2Starts()
+{
+    const int count = git_libgit2_init() - 1;
+    git_libgit2_shutdown();
+    return count;
+}
+
 } // namespace vclink::test

@@ -17,4 +17,7 @@ class LibGit2Session
     ~LibGit2Session();
 };
 
+/// How often libgit2 was started and not yet shut down, as it counts itself.
+int countLibGit2Starts();
+
 } // namespace vclink::test

@@ -26,10 +26,13 @@ std::string textOf(const char *attribute, const logging::record_view &view)
     return value ? *value : std::string();
 }
 
-class Backend : public logging::sinks::basic_sink_backend<logging::sinks::concurrent_feeding>
+} // namespace
+
+class CapturingBackend
+    : public logging::sinks::basic_sink_backend<logging::sinks::concurrent_feeding>
 {
   public:
-    explicit Backend(std::string channel) : channel_(std::move(channel))
+    explicit CapturingBackend(std::string channel) : channel_(std::move(channel))
     {
     }
 
@@ -68,22 +71,21 @@ class Backend : public logging::sinks::basic_sink_backend<logging::sinks::concur
     std::vector<LogRecord> records_;
 };
 
-using Sink = logging::sinks::synchronous_sink<Backend>;
-
-} // namespace
+using CapturingSink = logging::sinks::synchronous_sink<CapturingBackend>;
 
 struct LogCapture::Impl
 {
     explicit Impl(const std::string &name)
         : logger(name), severitiesBefore(vclink_host::getEnabledSeverities(name)),
-          backend(boost::make_shared<Backend>(name)), sink(boost::make_shared<Sink>(backend))
+          backend(boost::make_shared<CapturingBackend>(name)),
+          sink(boost::make_shared<CapturingSink>(backend))
     {
     }
 
     const std::string logger;
     const unsigned severitiesBefore;
-    const boost::shared_ptr<Backend> backend;
-    const boost::shared_ptr<Sink> sink;
+    const boost::shared_ptr<CapturingBackend> backend;
+    const boost::shared_ptr<CapturingSink> sink;
 };
 
 LogCapture::LogCapture(unsigned severities, const std::string &logger)

@@ -26,7 +26,7 @@ constexpr std::array filesUnderWay{"MERGE_HEAD",       "MERGE_MSG",   "MERGE_MOD
                                    "ORIG_HEAD",        "index.lock",  "HEAD.lock"};
 constexpr std::size_t longestContent = 120;
 
-std::string readFile(const fs::path &file)
+std::string readIfPossible(const fs::path &file)
 {
     std::ifstream stream(file, std::ios::binary);
     return {std::istreambuf_iterator<char>(stream), {}};
@@ -51,7 +51,7 @@ std::string contentOf(const fs::directory_entry &entry)
         return "link to " + fs::read_symlink(entry.path()).string();
     std::ostringstream text;
     text << std::oct << static_cast<unsigned>(entry.status().permissions()) << ' '
-         << (entry.is_directory() ? "folder" : shortened(readFile(entry.path())));
+         << (entry.is_directory() ? "folder" : shortened(readIfPossible(entry.path())));
     return text.str();
 }
 
@@ -88,11 +88,11 @@ RepositoryState stateOf(const GitRepository &repository)
     state.head = repository.tryGit({"symbolic-ref", "--quiet", "HEAD"}).output +
                  repository.tryGit({"rev-parse", "--quiet", "--verify", "HEAD"}).output;
     state.references = repository.git({"for-each-ref", "--format=%(refname) %(objectname)"});
-    state.reflog = readFile(folder / "logs/HEAD");
+    state.reflog = readIfPossible(folder / "logs/HEAD");
     for (const auto *name : filesUnderWay)
     {
         if (fs::exists(folder / name))
-            state.underWay.emplace(name, readFile(folder / name));
+            state.underWay.emplace(name, readIfPossible(folder / name));
     }
     state.index = indexOf(repository);
     state.workingTree = workingTreeOf(repository);
@@ -162,7 +162,7 @@ FileStamp stampOf(const fs::path &file)
     }
     const bool isFile = S_ISREG(status.st_mode);
     return {status.st_ino, nanoseconds(status.st_mtim), nanoseconds(status.st_ctim),
-            isFile ? readFile(file) : std::string()};
+            isFile ? readIfPossible(file) : std::string()};
 }
 
 FileStamp indexStampOf(const GitRepository &repository)

@@ -95,7 +95,7 @@ bool readAnswer(int answerEnd, std::chrono::milliseconds timeout, std::string &t
     }
 }
 
-int collectStatus(pid_t child)
+int waitForStatus(pid_t child)
 {
     int status = 0;
     while (::waitpid(child, &status, 0) < 0)
@@ -136,7 +136,7 @@ std::string runAsUnprivilegedUser(const std::function<std::string()> &action,
     ::close(ends[0]);
     if (!inTime)
         ::kill(child, SIGKILL);
-    const int status = collectStatus(child);
+    const int status = waitForStatus(child);
     if (!inTime)
         return "the child process took too long";
     if (WIFSIGNALED(status))

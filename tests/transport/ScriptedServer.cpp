@@ -21,7 +21,7 @@ namespace
 
 constexpr int limitMilliseconds = 60'000;
 
-[[noreturn]] void raise(const char *what)
+[[noreturn]] void raiseSocketError(const char *what)
 {
     throw std::system_error(errno, std::generic_category(), what);
 }
@@ -39,7 +39,7 @@ Descriptor makeSocket()
 {
     Descriptor made(::socket(AF_INET, SOCK_STREAM | SOCK_CLOEXEC, 0));
     if (made.get() < 0)
-        raise("socket");
+        raiseSocketError("socket");
     return made;
 }
 
@@ -49,7 +49,7 @@ Descriptor listenAnywhere()
     const sockaddr_in address = loopback(0);
     if (::bind(listener.get(), reinterpret_cast<const sockaddr *>(&address), sizeof address) != 0 ||
         ::listen(listener.get(), 8) != 0)
-        raise("listen");
+        raiseSocketError("listen");
     return listener;
 }
 
@@ -58,7 +58,7 @@ std::uint16_t portOf(int socket)
     sockaddr_in address{};
     socklen_t size = sizeof address;
     if (::getsockname(socket, reinterpret_cast<sockaddr *>(&address), &size) != 0)
-        raise("getsockname");
+        raiseSocketError("getsockname");
     return ntohs(address.sin_port);
 }
 
@@ -99,7 +99,7 @@ Connection Connection::open(std::uint16_t port, int stop)
     Descriptor socket = makeSocket();
     const sockaddr_in address = loopback(port);
     if (::connect(socket.get(), reinterpret_cast<const sockaddr *>(&address), sizeof address) != 0)
-        raise("connect");
+        raiseSocketError("connect");
     return Connection(std::move(socket), stop);
 }
 
@@ -111,7 +111,7 @@ void Connection::waitFor(short events) const
         ready = ::poll(waited.data(), waited.size(), limitMilliseconds);
     while (ready < 0 && errno == EINTR);
     if (ready < 0)
-        raise("poll");
+        raiseSocketError("poll");
     if (ready == 0)
         throw std::runtime_error("the other side keeps silent");
     if (waited[1].revents != 0)
@@ -124,7 +124,7 @@ std::string Connection::read(std::size_t limit)
     std::string bytes(limit, '\0');
     const auto count = ::recv(socket_.get(), bytes.data(), bytes.size(), 0);
     if (count < 0)
-        raise("recv");
+        raiseSocketError("recv");
     bytes.resize(static_cast<std::size_t>(count));
     return bytes;
 }
@@ -152,7 +152,7 @@ void Connection::write(const std::string &bytes)
         if (count >= 0)
             done += static_cast<std::size_t>(count);
         else if (errno != EAGAIN)
-            raise("send");
+            raiseSocketError("send");
     }
 }
 

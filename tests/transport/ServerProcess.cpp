@@ -35,7 +35,7 @@ using namespace std::chrono_literals;
 constexpr auto startLimit = 60s;
 constexpr int endLimitMilliseconds = 10'000;
 
-[[noreturn]] void raise(const std::string &what)
+[[noreturn]] void raiseProcessError(const std::string &what)
 {
     throw std::system_error(errno, std::generic_category(), what);
 }
@@ -93,7 +93,7 @@ int openOrRaise(const char *path, int flags)
 {
     const int file = ::open(path, flags | O_CLOEXEC, 0644);
     if (file < 0)
-        raise(path);
+        raiseProcessError(path);
     return file;
 }
 
@@ -137,7 +137,7 @@ ServerProcess::ServerProcess(std::vector<std::string> arguments, const fs::path 
     ::close(output);
     errno = error;
     if (process_ < 0)
-        raise("fork");
+        raiseProcessError("fork");
 }
 
 ServerProcess::~ServerProcess()

@@ -9,10 +9,8 @@
 
 namespace vclink_host_tests
 {
-namespace
-{
 
-class Backend
+class RecordingBackend
     : public boost::log::sinks::basic_sink_backend<boost::log::sinks::synchronized_feeding>
 {
   public:
@@ -27,13 +25,11 @@ class Backend
     std::vector<SeenRecord> records;
 };
 
-} // namespace
-
 struct LogRecorder::Impl
 {
-    boost::shared_ptr<Backend> backend = boost::make_shared<Backend>();
-    boost::shared_ptr<boost::log::sinks::synchronous_sink<Backend>> sink =
-        boost::make_shared<boost::log::sinks::synchronous_sink<Backend>>(backend);
+    boost::shared_ptr<RecordingBackend> backend = boost::make_shared<RecordingBackend>();
+    boost::shared_ptr<boost::log::sinks::synchronous_sink<RecordingBackend>> sink =
+        boost::make_shared<boost::log::sinks::synchronous_sink<RecordingBackend>>(backend);
 };
 
 LogRecorder::LogRecorder() : impl_(std::make_unique<Impl>())

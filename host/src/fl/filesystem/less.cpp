@@ -11,7 +11,7 @@ namespace fl::filesystem::detail
 namespace
 {
 
-constexpr char16_t separator = u'/';
+constexpr char16_t slash = u'/';
 
 /// Where the texts first differ, at most the length of the shorter one. Eight bytes a step: this is
 /// most of what an insertion into a map of a repository's paths costs.
@@ -40,20 +40,20 @@ std::size_t findDifference(std::u16string_view left, std::u16string_view right) 
 
 bool endsElement(std::u16string_view path, std::size_t position) noexcept
 {
-    return position == path.size() || path[position] == separator;
+    return position == path.size() || path[position] == slash;
 }
 
 /// Whether a name comes at the position or behind it.
 bool hasName(std::u16string_view path, std::size_t position) noexcept
 {
-    return path.find_first_not_of(separator, position) != std::u16string_view::npos;
+    return path.find_first_not_of(slash, position) != std::u16string_view::npos;
 }
 
 /// Takes the next name off the path; empty when there is none.
 std::u16string_view takeName(std::u16string_view &path) noexcept
 {
-    path.remove_prefix(std::min(path.find_first_not_of(separator), path.size()));
-    const std::u16string_view name = path.substr(0, path.find(separator));
+    path.remove_prefix(std::min(path.find_first_not_of(slash), path.size()));
+    const std::u16string_view name = path.substr(0, path.find(slash));
     path.remove_prefix(name.size());
     return name;
 }
@@ -75,15 +75,15 @@ bool lessByNames(std::u16string_view left, std::u16string_view right) noexcept
 
 bool lessByElements(std::u16string_view left, std::u16string_view right) noexcept
 {
-    const bool leftIsRooted = !left.empty() && left.front() == separator;
-    const bool rightIsRooted = !right.empty() && right.front() == separator;
+    const bool leftIsRooted = !left.empty() && left.front() == slash;
+    const bool rightIsRooted = !right.empty() && right.front() == slash;
     if (leftIsRooted == rightIsRooted)
     {
         return lessByNames(left, right);
     }
     // The root is an element like others, "/", and a name never begins with a slash.
-    return leftIsRooted ? !right.empty() && separator < right.front()
-                        : left.empty() || left.front() < separator;
+    return leftIsRooted ? !right.empty() && slash < right.front()
+                        : left.empty() || left.front() < slash;
 }
 
 } // namespace
@@ -99,7 +99,7 @@ bool less(const ustring &left, const ustring &right) noexcept
     {
         return leftPath[difference] < rightPath[difference];
     }
-    if (difference > 0 && leftPath[difference - 1] != separator)
+    if (difference > 0 && leftPath[difference - 1] != slash)
     {
         // The same name up to here. Where it ends in one path only, that path is less; where it
         // ends in both, one of them has nothing left.

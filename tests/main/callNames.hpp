@@ -1,0 +1,23 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <string>
+#include <vector>
+
+namespace vclink::test
+{
+
+/// Functions in the order in which they were called.
+using CallNames = std::vector<std::string>;
+
+/// The calls of the query that comes before files are staged or reverted.
+inline const CallNames ofTheQuery{"git_status_options_init", "git_repository_open_ext",
+                                  "git_status_foreach_ext", "git_repository_free"};
+
+inline CallNames operator+(CallNames left, const CallNames &right)
+{
+    left.insert(left.end(), right.begin(), right.end());
+    return left;
+}
+
+} // namespace vclink::test
