@@ -1,17 +1,27 @@
 # SPDX-License-Identifier: MIT
 # The layers' sources are compiled once, as objects: the shared library shows of them what the host
 # sees, and the tests link the objects themselves and so reach what is hidden.
-add_library(vclink_git_objects OBJECT)
-vclink_configure_target(vclink_git_objects)
+#
+# vclink_add_layer_objects(TARGET): objects that are compiled as the layers' are.
+option(VCLINK_UNITY_LAYERS "Let CMAKE_UNITY_BUILD join the layers' sources too" OFF)
+function(vclink_add_layer_objects target)
+    add_library(${target} OBJECT)
+    vclink_configure_target(${target})
+    target_link_libraries(${target} PRIVATE vclink_hardening)
+    # Whole debug information, whatever the preset says: the packages for debuggers and the report on
+    # the binary interface are made from it.
+    target_compile_options(${target} PRIVATE $<$<CONFIG:RelWithDebInfo>:-g2>)
+    if(NOT VCLINK_UNITY_LAYERS)
+        set_target_properties(${target} PROPERTIES UNITY_BUILD OFF)
+    endif()
+endfunction()
+
+vclink_add_layer_objects(vclink_git_objects)
 vclink_measure(vclink_git_objects)
 target_include_directories(vclink_git_objects PUBLIC
     ${PROJECT_SOURCE_DIR} ${PROJECT_SOURCE_DIR}/include)
 target_link_libraries(vclink_git_objects
-    PUBLIC vclink::host Boost::headers Boost::filesystem Boost::thread PkgConfig::libgit2
-    PRIVATE vclink_hardening)
-# Whole debug information, whatever the preset says: the packages for debuggers and the report on the
-# binary interface are made from it.
-target_compile_options(vclink_git_objects PRIVATE $<$<CONFIG:RelWithDebInfo>:-g2>)
+    PUBLIC vclink::host Boost::headers Boost::filesystem Boost::thread PkgConfig::libgit2)
 
 add_library(vclink_git SHARED)
 add_library(vclink::git ALIAS vclink_git)

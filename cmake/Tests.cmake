@@ -10,10 +10,12 @@
 # time of a case in tenths of a second, 1 by default: ctest starts the longest tests first. TIMEOUT
 # is that of a test, 600 by default.
 #
+# The target vclink_tests_labelled_LABEL builds the programs with this label.
+#
 # A skipped case is a failure, and so is a program that ends before its last case.
 add_library(vclink_test_complete_run OBJECT
     ${CMAKE_CURRENT_LIST_DIR}/../tests/support/completeRun.cpp)
-vclink_configure_target(vclink_test_complete_run)
+vclink_configure_test_target(vclink_test_complete_run)
 target_link_libraries(vclink_test_complete_run PRIVATE GTest::gtest)
 
 function(vclink_discover_tests target)
@@ -28,6 +30,10 @@ function(vclink_discover_tests target)
         set(arg_TIMEOUT 600)
     endif()
     target_link_libraries(${target} PRIVATE vclink_test_complete_run)
+    if(NOT TARGET vclink_tests_labelled_${arg_LABEL})
+        add_custom_target(vclink_tests_labelled_${arg_LABEL})
+    endif()
+    add_dependencies(vclink_tests_labelled_${arg_LABEL} ${target})
     # A mutant may be unable to list its tests; scripts/mutate runs the programs itself.
     if(VCLINK_RECORD_REACH)
         return()
@@ -60,28 +66,54 @@ endfunction()
 #     [COST cost]): such a program. It links the layers' objects, so that what the library hides
 # can be tested too.
 #
-# vclink_thread_tests builds the executables whose tests are labelled "threads" and nothing else, for
-# the builds under ThreadSanitizer.
-add_custom_target(vclink_thread_tests)
+# The objects come first on the link line: of an inline function that both have compiled, the linker
+# keeps the layers' one, with the layers' instrumentation and optimisation. Tests themselves may
+# have less of both (VCLINK_TEST_OPTIONS). tests/instrumentation holds this.
+set(VCLINK_RUN_LABELS "" CACHE STRING
+    "Labels of the tests that can be run, all if empty; other tests only have to compile")
+
+# vclink_is_run(RESULT LABEL...): whether tests with one of the labels can be run in this build.
+function(vclink_is_run result)
+    set(${result} FALSE PARENT_SCOPE)
+    foreach(label IN LISTS ARGN)
+        if(NOT VCLINK_RUN_LABELS OR label IN_LIST VCLINK_RUN_LABELS)
+            set(${result} TRUE PARENT_SCOPE)
+        endif()
+    endforeach()
+endfunction()
+
+# vclink_configure_tests(TARGET LABEL...): a program, or a library of programs, whose tests have these
+# labels. If none of them can be run, the compiler reports errors and warnings, and makes no code.
+function(vclink_configure_tests target)
+    vclink_configure_test_target(${target})
+    vclink_is_run(run ${ARGN})
+    if(NOT run)
+        set_target_properties(${target} PROPERTIES
+            CXX_COMPILER_LAUNCHER "${PROJECT_SOURCE_DIR}/cmake/checkOnly.sh")
+    endif()
+endfunction()
 
 function(vclink_add_tests target)
     cmake_parse_arguments(PARSE_ARGV 1 arg "EACH_CASE" "LABEL;COST" "SOURCES;LIBRARIES")
     if(arg_UNPARSED_ARGUMENTS)
         message(FATAL_ERROR "${target}: what is '${arg_UNPARSED_ARGUMENTS}'?")
     endif()
-    add_executable(${target}
-        ${arg_SOURCES}
-        ${PROJECT_SOURCE_DIR}/tests/support/leakSuppressions.cpp
-        ${PROJECT_SOURCE_DIR}/tests/support/raceSuppressions.cpp)
-    vclink_configure_target(${target})
+    vclink_is_run(run ${arg_LABEL})
+    if(run)
+        add_executable(${target} ${arg_SOURCES})
+    else()
+        add_library(${target} OBJECT ${arg_SOURCES})
+    endif()
+    vclink_configure_tests(${target} ${arg_LABEL})
     target_link_libraries(${target} PRIVATE
-        vclink_git_objects vclink_test_support ${arg_LIBRARIES} GTest::gmock GTest::gtest_main)
+        vclink_git_objects vclink_test_suppressions vclink_test_support ${arg_LIBRARIES}
+        GTest::gmock GTest::gtest_main)
+    if(NOT run)
+        return()
+    endif()
     if(VCLINK_RECORD_REACH)
         target_sources(${target} PRIVATE ${PROJECT_SOURCE_DIR}/tests/support/ReachRecorder.cpp)
         target_link_libraries(${target} PRIVATE ${CMAKE_DL_LIBS})
-    endif()
-    if(arg_LABEL STREQUAL "threads")
-        add_dependencies(vclink_thread_tests ${target})
     endif()
     set(options)
     if(arg_EACH_CASE)

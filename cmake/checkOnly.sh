@@ -1,0 +1,7 @@
+#!/bin/sh
+# SPDX-License-Identifier: MIT
+# checkOnly.sh COMPILER OPTION...: a compiler launcher that reports what the compiler has to say, and
+# leaves an empty object, which nothing links.
+"$@" -fsyntax-only || exit
+while [ "$1" != -o ]; do shift; done
+: >"$2"

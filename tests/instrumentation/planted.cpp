@@ -1,0 +1,14 @@
+// SPDX-License-Identifier: MIT
+#include "instrumentation/planted.hpp"
+
+namespace vclink::planted
+{
+
+int useAll(int number)
+{
+    const char byte = 'a';
+    countUp(number);
+    return successor(number) + byteAt(&byte, 0) + (isOptimised() ? 1 : 0);
+}
+
+} // namespace vclink::planted
