@@ -93,6 +93,8 @@ void checkSplit(const std::string &command)
             word = stripPlainly(word);
         require(boost::process::detail::posix::build_args(command) == words,
                 "a command that is not refused is split into its words");
+        require(vclink::git::findFirstWord(command).text == words.front(),
+                "the first of them is the one that is looked up");
     }
 }
 

@@ -2,6 +2,7 @@
 #include "util/commandLine.hpp"
 
 #include <cstddef>
+#include <utility>
 
 #include <boost/algorithm/string/replace.hpp>
 #include <unistd.h>
@@ -62,6 +63,24 @@ const char *findCommandFault(const std::string &command) noexcept
         return "the environment is empty";
     }
     return nullptr;
+}
+
+CommandWord findFirstWord(const std::string &command)
+{
+    const std::size_t begin = command.find_first_not_of(blank);
+    bool isQuoted = false;
+    std::size_t end = begin;
+    for (; end < command.size() && (isQuoted || command[end] != blank); ++end)
+    {
+        isQuoted = isQuoted != (command[end] == quote);
+    }
+    std::string text = command.substr(begin, end - begin);
+    if (text.front() == quote && text.back() == quote)
+    {
+        text = text.substr(1, text.size() - 2);
+    }
+    boost::algorithm::replace_all(text, "\\\"", "\"");
+    return {begin, end - begin, std::move(text)};
 }
 
 } // namespace vclink::git

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include <cstddef>
 #include <map>
 #include <string>
 
@@ -17,5 +18,18 @@ std::string expandPlaceholders(const std::string &commandTemplate,
 /// words: no word at all, a lone double quote as the last word, an empty environment.
 /// @return the fault in words; null when there is none
 const char *findCommandFault(const std::string &command) noexcept;
+
+/// One word of a command: its place, and what Boost.Process makes of it.
+struct CommandWord
+{
+    std::size_t begin;
+    std::size_t size;
+    std::string text;
+};
+
+/// The word that names the program, as Boost.Process splits a command: at blanks outside double
+/// quotes, with one pair of quotes around the word taken off.
+/// @param command one without the faults of findCommandFault()
+CommandWord findFirstWord(const std::string &command);
 
 } // namespace vclink::git

@@ -30,6 +30,7 @@
 #include "util/ChildStatus.hpp"
 #include "util/StartGuard.hpp"
 #include "util/commandLine.hpp"
+#include "util/programLookup.hpp"
 
 namespace vclink::git
 {
@@ -83,7 +84,8 @@ process::pipe makePipe()
     return pipe;
 }
 
-void refuseUnusable(const std::string &command)
+/// What to hand to Boost.Process for a command.
+std::string makeUsable(const std::string &command)
 {
     const char *const fault = findCommandFault(command);
     if (fault != nullptr)
@@ -95,6 +97,11 @@ void refuseUnusable(const std::string &command)
         raiseIfError(std::error_code(ECHILD, std::system_category()),
                      "the process ignores SIGCHLD, so that no exit status can be known");
     }
+    std::error_code error;
+    std::string named = nameProgram(command, error);
+    // In the words in which Boost.Process tells of a program that can't be executed.
+    raiseIfError(error, "execve failed");
+    return named;
 }
 
 bool isRunning(ChildStatus &status)
@@ -131,9 +138,9 @@ int runCommand(const std::string &commandTemplate,
     const std::string command = expandPlaceholders(commandTemplate, placeholders);
     process::ipstream output(makePipe());
     writeRecord(SeverityDiagnostic, "Command: ", command);
-    refuseUnusable(command);
+    const std::string usable = makeUsable(command);
     StartGuard guard(output.pipe().native_source(), output.pipe().native_sink());
-    process::child child(command, process::std_out > output, process::std_err > process::null,
+    process::child child(usable, process::std_out > output, process::std_err > process::null,
                          boost::this_process::environment());
     // Where the process can't be forked, Boost.Process raises nothing and gives no child, whose
     // number would mean every child of the process.

@@ -12,6 +12,7 @@ namespace
 
 using vclink::git::expandPlaceholders;
 using vclink::git::findCommandFault;
+using vclink::git::findFirstWord;
 
 const std::map<std::string, std::string> &driverValues()
 {
@@ -107,6 +108,29 @@ TEST(CommandFault, IsAnEmptyEnvironment)
     EXPECT_EQ(emptied, "the environment is empty");
     EXPECT_EQ(absent, "the environment is empty");
     EXPECT_EQ(fault("tool"), "");
+}
+
+TEST(FirstWord, IsWhatBoostProcessTakesForTheProgram)
+{
+    struct Row
+    {
+        const char *command;
+        const char *written; ///< in the command
+        const char *text;
+    };
+    for (const Row &row :
+         {Row{"tool", "tool", "tool"}, Row{"  tool x", "tool", "tool"},
+          Row{"tool  \"a b\"", "tool", "tool"}, Row{"\"tool\" x", "\"tool\"", "tool"},
+          Row{"\"a b/tool\" x", "\"a b/tool\"", "a b/tool"},
+          Row{"\"a b\"c x", "\"a b\"c", "\"a b\"c"}, Row{"a\"b c\"d x", "a\"b c\"d", "a\"b c\"d"},
+          Row{"\"\" x", "\"\"", ""}, Row{"\\\"a\\\" x", "\\\"a\\\"", "\"a\""},
+          Row{"\"a b", "\"a b", "\"a b"}, Row{"\ttool\n x", "\ttool\n", "\ttool\n"}})
+    {
+        const std::string command = row.command;
+        const auto word = findFirstWord(command);
+        EXPECT_EQ(command.substr(word.begin, word.size), row.written) << command;
+        EXPECT_EQ(word.text, row.text) << command;
+    }
 }
 
 } // namespace

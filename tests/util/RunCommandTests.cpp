@@ -103,23 +103,6 @@ TEST_F(RunCommand, StartsALauncherInQuotesWhosePathHasABlank)
     EXPECT_EQ(resultOf("\"" + launcher.string() + "\" x"), 0);
 }
 
-TEST_F(RunCommand, LooksAProgramWithoutASlashUpInThePath)
-{
-    const std::filesystem::path program = scripts_.shell("exit 42");
-    // The release in use does not look into the first folder.
-    ::setenv("PATH", ("/nowhere:" + program.parent_path().string() + ":/usr/bin:/bin").c_str(), 1);
-    EXPECT_EQ(resultOf(program.filename()), 42);
-}
-
-TEST_F(RunCommand, PrefersAProgramOfTheWorkingFolderToThePath)
-{
-    const std::filesystem::path program = scripts_.shell("exit 43");
-    std::filesystem::create_directory(folder() / "cwd");
-    std::filesystem::copy(program, folder() / "cwd" / "true");
-    const WorkingFolder there(folder() / "cwd");
-    EXPECT_EQ(resultOf("true"), 43);
-}
-
 TEST_F(RunCommand, RunsInTheWorkingFolderOfTheProcess)
 {
     const WorkingFolder there(folder().path());
