@@ -2,6 +2,7 @@
 #pragma once
 
 #include "fl/filesystem/path.hpp"
+#include "fl/ustring.hpp"
 #include "vclink/FileState.hpp"
 #include "vclink/FileStateMap.hpp"
 
@@ -22,6 +23,9 @@ class StatusCallbacks
 
     upath root;
     FileStateMap states;
+
+  private:
+    ustring nameBuffer_;
 };
 
 /// The one state that a file's git_status_t bits come down to. The order of the tests decides: a

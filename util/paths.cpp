@@ -86,17 +86,18 @@ bool isAscii(std::string_view text)
     return (seen & highBits) == 0;
 }
 
-/// Appends an ASCII name, which is not empty, without a conversion of its own: this runs once for
-/// each file of a status walk. The separator is still the host's affair, which sees how the name
-/// begins.
-void appendAsciiName(ustring &text, std::string_view name, bool native)
+/// Puts the name into `converted`, whose room is used again where the name is ASCII, as nearly all
+/// are: this runs once for each file of a status walk.
+void convertName(const char *name, ustring &converted)
 {
-    const ustring beginning(1, static_cast<char16_t>(name.front()));
-    fl::filesystem::detail::concatenate_pathname(text, beginning, native);
-    name.remove_prefix(1);
-    const std::size_t start = text.size();
-    text.resize(start + name.size());
-    std::transform(name.begin(), name.end(), text.begin() + static_cast<std::ptrdiff_t>(start),
+    const std::string_view units(name);
+    if (!isAscii(units))
+    {
+        converted = fl::i18n::utf8_to_ustring(name);
+        return;
+    }
+    converted.resize(units.size());
+    std::transform(units.begin(), units.end(), converted.begin(),
                    [](char unit) { return static_cast<char16_t>(unit); });
 }
 
@@ -148,18 +149,19 @@ ustring relativeToRoot(const upath &root, const upath &path)
 
 upath joinRepositoryPath(const upath &root, const char *name)
 {
-    const std::string_view added(name);
+    ustring buffer;
+    return joinRepositoryPath(root, name, buffer);
+}
+
+upath joinRepositoryPath(const upath &root, const char *name, ustring &buffer)
+{
+    convertName(name, buffer);
     ustring text;
-    text.reserve(root.string().size() + 1 + added.size());
+    text.reserve(root.string().size() + 1 + buffer.size());
     text = root.string();
-    if (!added.empty() && isAscii(added))
+    if (!buffer.empty())
     {
-        appendAsciiName(text, added, root.native());
-    }
-    else if (!added.empty())
-    {
-        const ustring converted = fl::i18n::utf8_to_ustring(name);
-        fl::filesystem::detail::concatenate_pathname(text, converted, root.native());
+        fl::filesystem::detail::concatenate_pathname(text, buffer, root.native());
     }
     return upath(std::move(text), root.native());
 }

@@ -48,4 +48,7 @@ ustring relativeToRoot(const upath &root, const upath &path);
 /// @param name relative to the root, UTF-8 or any other bytes, never null
 upath joinRepositoryPath(const upath &root, const char *name);
 
+/// The same, for many names: the converted name is put into `buffer`, whose room serves the next.
+upath joinRepositoryPath(const upath &root, const char *name, ustring &buffer);
+
 } // namespace vclink::git

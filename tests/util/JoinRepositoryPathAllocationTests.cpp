@@ -16,11 +16,21 @@ using vclink::test::AllocationCounter;
 
 constexpr const char *longName = "a/folder/of/some/depth/and/a/file/of/40.txt";
 
-TEST(JoinRepositoryPathAllocation, TakesOneOfTheRightSizeForAKey)
+TEST(JoinRepositoryPathAllocation, TakesOneForTheNameAndOneForTheKey)
 {
     const upath root(u"/home/somebody/code/repository");
     const AllocationCounter counter;
     const upath joined = joinRepositoryPath(root, longName);
+    EXPECT_EQ(counter.count(), 2U);
+    EXPECT_EQ(joined.string().size(), root.string().size() + 1 + std::strlen(longName));
+}
+
+TEST(JoinRepositoryPathAllocation, TakesOneOfTheRightSizeForAKeyWhereABufferServes)
+{
+    const upath root(u"/home/somebody/code/repository");
+    ustring buffer(std::strlen(longName), u'x');
+    const AllocationCounter counter;
+    const upath joined = joinRepositoryPath(root, longName, buffer);
     const std::size_t count = counter.count();
     const std::size_t bytes = counter.bytes();
     EXPECT_EQ(count, 1U);
@@ -28,7 +38,7 @@ TEST(JoinRepositoryPathAllocation, TakesOneOfTheRightSizeForAKey)
     EXPECT_EQ(joined.string().size(), root.string().size() + 1 + std::strlen(longName));
 }
 
-TEST(JoinRepositoryPathAllocation, TakesOneMoreForANameThatIsNotAscii)
+TEST(JoinRepositoryPathAllocation, TakesNoMoreForANameThatIsNotAscii)
 {
     const upath root(u"/home/somebody/code/repository");
     const AllocationCounter counter;

@@ -72,6 +72,14 @@ TEST(JoinRepositoryPath, KeepsBytesThatAreNotUtf8)
     }
 }
 
+TEST(JoinRepositoryPath, KeepsNothingOfTheNameBeforeInItsBuffer)
+{
+    const upath root(u"/r");
+    ustring buffer = u"before";
+    for (const auto &name : {"a/long/name/of/a/file", "b", "", "\xC3\xBC/x", "c/d", "\xFF"})
+        EXPECT_EQ(joinRepositoryPath(root, name, buffer), joinRepositoryPath(root, name)) << name;
+}
+
 TEST(JoinRepositoryPath, GivesWhatTheHostsOwnOperationsGive)
 {
     const std::vector<ustring> roots{u"", u"/", u"/r", u"/r/", u"r", u"//r//", u"/r\\", u"/\u00FC"};
