@@ -146,7 +146,8 @@ void BasicBranchManager::merge(BranchName name)
 std::string BasicBranchManager::getRepositoryState() const
 {
     const OwnedHandle<git_repository> repository = adapter_.getRepository();
-    return describeRepositoryState(readRepositoryState(repository.get()));
+    // The plain answer, which can't fail: only a merge and a commit have to look more closely.
+    return describeRepositoryState(git_repository_state(repository.get()));
 }
 
 std::string describeRepositoryState(int state)

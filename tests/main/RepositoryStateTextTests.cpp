@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: MIT
+#include <filesystem>
 #include <string>
 #include <vector>
 
@@ -7,6 +8,7 @@
 
 #include "BranchTest.hpp"
 #include "main/BasicBranchManager.hpp"
+#include "vclink/git/GitException.hpp"
 
 namespace
 {
@@ -155,6 +157,21 @@ TEST_F(RepositoryStateText, FailsOnlyWhereTheRepositoryCannotBeOpened)
 {
     repository_.remove(".git");
     EXPECT_EQ(libGit2FailureOf([this] { branches().getRepositoryState(); }).code, GIT_ENOTFOUND);
+}
+
+/// Nothing tells then whether a merge is under way, and what would write must not guess.
+TEST_F(RepositoryStateText, IsNormalWhereMergeHeadCannotBeLookedAt)
+{
+    const std::string file = repository_ / ".git/MERGE_HEAD";
+    const std::string head = idOf("HEAD");
+    std::filesystem::create_symlink("MERGE_HEAD", file);
+    EXPECT_EQ(branches().getRepositoryState(), "Normal");
+    EXPECT_EQ(libGit2FailureOf([this] { adapter_->commit(upath(), u"message"); }).text,
+              "could not read '" + file + "': Too many levels of symbolic links");
+    EXPECT_THROW(branches().merge("topic"), vclink::git::GitException);
+    std::filesystem::remove(file);
+    EXPECT_EQ(idOf("HEAD"), head);
+    EXPECT_TRUE(status().empty());
 }
 
 TEST_F(RepositoryStateText, HasAWordForEachNumber)

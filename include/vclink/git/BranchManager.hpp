@@ -87,7 +87,8 @@ class VCLINK_GIT_EXPORT BranchManager
 
     /// The repository's state in words: "Normal", "Conflicts" while a merge, revert or cherry-pick
     /// is under way, "Bisecting", "Rebase", "Rebase interactive", "Rebase w/merge", "Apply
-    /// mailbox", "Rebase/Apply mailbox". git_repository_state.
+    /// mailbox", "Rebase/Apply mailbox". Throws only if the repository cannot be opened.
+    /// git_repository_state.
     virtual std::string getRepositoryState() const = 0;
 };
 
