@@ -36,6 +36,10 @@ void CheckoutCallbacks::checkoutProgress(const char *path, std::size_t completed
     const bool hasPath = path != nullptr && *path != '\0';
     writeRecord(SeverityParameter, " pathStr=", path, " completed_steps=", completedSteps,
                 " total_steps=", totalSteps);
+    if (reporter == nullptr)
+    {
+        return;
+    }
     if (completedSteps == 0)
     {
         // Once more below for a first step with a path, which is meant.

@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: MIT
+#include <memory>
 #include <stdexcept>
 #include <string>
 
@@ -10,6 +11,7 @@
 #include "error/logging/severity.hpp"
 #include "support/LogCapture.hpp"
 #include "support/cancelAt.hpp"
+#include "support/text.hpp"
 #include "vclink/util/exception/CancelledOperationException.hpp"
 
 namespace
@@ -24,6 +26,15 @@ using vclink::test::NothingChanges;
 using vclink::test::ProgressCall;
 using vclink::test::stateOf;
 using vclink::util::exception::CancelledOperationException;
+
+class InteractorWithoutDisplay : public vclink::test::TestInteractor
+{
+  public:
+    vclink::ProgressReporter *getProgressReporter() override
+    {
+        return nullptr;
+    }
+};
 
 class SwitchBranchProgress : public vclink::test::SwitchBranchTest
 {
@@ -55,6 +66,15 @@ TEST_F(SwitchBranchProgress, GoesOnWhenItsProgressCannotBeShown)
     EXPECT_NO_THROW(switchTo("topic"));
     expectSame(stateOf(repository_), expected);
     EXPECT_EQ(git::pendingCallbackException(), nullptr);
+}
+
+TEST_F(SwitchBranchProgress, NeedsNoDisplay)
+{
+    const auto expected = stateAfterGit("topic");
+    git::GitAdapter adapter(vclink::test::asPath(repository_.path()),
+                            std::make_shared<InteractorWithoutDisplay>());
+    git::BranchManager::create(adapter)->switchBranch("topic");
+    expectSame(stateOf(repository_), expected);
 }
 
 TEST_F(SwitchBranchProgress, CancelledBeforeItsStartMovesNothing)

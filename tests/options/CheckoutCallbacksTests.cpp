@@ -50,12 +50,13 @@ class DisplayInteractor : public TestInteractor
     ProgressReporter *getProgressReporter() override
     {
         ++asked;
-        if (reporter == nullptr)
+        if (isLost)
             throw std::runtime_error("no display");
         return reporter;
     }
 
     int asked = 0;
+    bool isLost = false;
     ProgressReporter *reporter = &progress;
 };
 
@@ -273,9 +274,22 @@ TEST_F(CheckoutProgress, AsksForTheDisplayAtEachStep)
 TEST_F(CheckoutProgress, AsksForTheDisplayBeforeAllElse)
 {
     const LogCapture log;
-    interactor_.reporter = nullptr;
+    interactor_.isLost = true;
     EXPECT_THROW(callbacks_.checkoutProgress("file", 1, 2), std::runtime_error);
     EXPECT_THAT(log.records(), IsEmpty());
+}
+
+TEST_F(CheckoutProgress, OnlyWritesItsRecordsWithoutADisplay)
+{
+    const LogCapture log;
+    interactor_.reporter = nullptr;
+    EXPECT_THAT(callsOf("file", 0, 2), IsEmpty());
+    EXPECT_THAT(callsOf("file", 2, 2), IsEmpty());
+    EXPECT_THAT(callsOf(nullptr, 0, 0), IsEmpty());
+    EXPECT_EQ(interactor_.asked, 3);
+    EXPECT_THAT(log.messages(), ElementsAre(" pathStr=file completed_steps=0 total_steps=2",
+                                            " pathStr=file completed_steps=2 total_steps=2",
+                                            " pathStr= completed_steps=0 total_steps=0"));
 }
 
 TEST_F(CheckoutProgress, RaisesWhatTheDisplayRaisesWithItsRecordWritten)

@@ -20,7 +20,7 @@ class VCLINK_HOST_EXPORT ApplicationInteractor
 
     /// The source of cancellation, valid as long as the interactor.
     virtual Terminator &getTerminator() = 0;
-    /// The sink of progress, valid as long as the interactor.
+    /// The sink of progress, valid as long as the interactor; null for no progress.
     virtual ProgressReporter *getProgressReporter() = 0;
 };
 
