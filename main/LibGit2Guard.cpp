@@ -3,6 +3,7 @@
 
 #include <git2/global.h>
 
+#include "error/logging/logger.hpp"
 #include "util/GitMergeDriverLookup.hpp"
 
 namespace vclink::git
@@ -10,6 +11,9 @@ namespace vclink::git
 
 LibGit2Guard::LibGit2Guard() : drivers_(std::make_unique<GitMergeDriverLookup>())
 {
+    // The logger, and Boost.Log's core below it, are made before any guard of static storage is
+    // complete, so that they outlive it and the record of its end.
+    static_cast<void>(logger().is_logging_enabled());
     git_libgit2_init();
     try
     {

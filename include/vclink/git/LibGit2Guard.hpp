@@ -25,6 +25,10 @@ class GitMergeDriverLookup;
 /// that probes many folders with GitAdapterFactory::isAdapterFor holds a guard of its own
 /// meanwhile.
 ///
+/// A guard may have static storage, and so may what holds one: the log outlives it. An object that
+/// is put into a static variable later, such as a std::unique_ptr that main fills, must be gone
+/// before main returns: the log may end before it.
+///
 /// Guards may be made and destroyed on any thread. Making one raises std::bad_alloc, and what the
 /// host's log sinks raise of its diagnostic records; libgit2 is then as it was before. A sink that
 /// raises of the record of a guard's end ends the process, as anything does that a destructor
