@@ -10,6 +10,7 @@
 #include <git2/repository.h>
 
 #include "error/errorUtil/GitResult.hpp"
+#include "error/errorUtil/gitString.hpp"
 #include "error/logging/ScopeTrace.hpp"
 #include "error/logging/logger.hpp"
 #include "main/BranchMerger.hpp"
@@ -43,10 +44,9 @@ std::vector<BranchPointer> listBranches(git_branch_t type, git_repository *repos
     }
 }
 
-OwnedHandle<git_reference> lookupLocalBranch(git_repository *repository, const std::string &name)
+OwnedHandle<git_reference> lookupLocalBranch(git_repository *repository, const char *name)
 {
-    return acquire<git_reference>(git_branch_lookup, repository, name.c_str(), GIT_BRANCH_LOCAL)
-        .value();
+    return acquire<git_reference>(git_branch_lookup, repository, name, GIT_BRANCH_LOCAL).value();
 }
 
 } // namespace
@@ -76,6 +76,7 @@ std::string BasicBranchManager::getHeadRevision() const
 
 std::string BasicBranchManager::getRevision(const std::string &revision) const
 {
+    refuseNul(revision);
     const OwnedHandle<git_repository> repository = adapter_.getRepository();
     std::array<char, GIT_OID_HEXSZ> digits{};
     git_oid_fmt(digits.data(), revparseId(revision, repository.get()));
@@ -84,6 +85,7 @@ std::string BasicBranchManager::getRevision(const std::string &revision) const
 
 git_oid BasicBranchManager::getRevisionId(const std::string &revision) const
 {
+    refuseNul(revision);
     const OwnedHandle<git_repository> repository = adapter_.getRepository();
     return *revparseId(revision, repository.get());
 }
@@ -94,8 +96,9 @@ void BasicBranchManager::switchBranch(const BranchName &name)
         logger(), "virtual void vclink::git::BasicBranchManager::switchBranch(const BranchName&)",
         "main/BasicBranchManager", 107);
     writeRecord(SeverityParameter, " branch=", name);
+    const char *const shortName = asGitString(name);
     const OwnedHandle<git_repository> repository = adapter_.getRepository();
-    const OwnedHandle<git_reference> branch = lookupLocalBranch(repository.get(), name);
+    const OwnedHandle<git_reference> branch = lookupLocalBranch(repository.get(), shortName);
     const OwnedHandle<git_object> target = revparseObject(repository.get(), name).value();
     const CheckoutOptions options = optionsFactory_->makeCheckoutOptions();
     git_checkout_options record = toGitCheckoutOptions(options, callbacks_->checkoutCallbacks());
@@ -107,18 +110,22 @@ void BasicBranchManager::switchBranch(const BranchName &name)
 
 void BasicBranchManager::createBranch(const BranchParameters &parameters)
 {
+    const std::string name = parameters.getName();
+    const std::string startPoint = parameters.getStartPoint();
+    refuseNul(name);
+    refuseNul(startPoint);
     const OwnedHandle<git_repository> repository = adapter_.getRepository();
     const OwnedHandle<git_commit> commit =
-        lookupCommitByName(parameters.getStartPoint().c_str(), repository.get()).value();
-    acquire<git_reference>(git_branch_create, repository.get(), parameters.getName().c_str(),
-                           commit.get(), 0)
+        lookupCommitByName(asGitString(startPoint), repository.get()).value();
+    acquire<git_reference>(git_branch_create, repository.get(), asGitString(name), commit.get(), 0)
         .value();
 }
 
 void BasicBranchManager::deleteBranch(const BranchName &name)
 {
+    const char *const shortName = asGitString(name);
     const OwnedHandle<git_repository> repository = adapter_.getRepository();
-    const OwnedHandle<git_reference> branch = lookupLocalBranch(repository.get(), name);
+    const OwnedHandle<git_reference> branch = lookupLocalBranch(repository.get(), shortName);
     makeResult(git_branch_delete(branch.get())).value();
 }
 

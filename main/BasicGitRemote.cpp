@@ -10,6 +10,7 @@
 #include <git2/remote.h>
 
 #include "error/errorUtil/GitResult.hpp"
+#include "error/errorUtil/gitString.hpp"
 #include "options/gitRecords.hpp"
 #include "util/PathspecArray.hpp"
 #include "util/SigpipeGuard.hpp"
@@ -19,9 +20,9 @@ namespace vclink::git
 namespace
 {
 
-OwnedHandle<git_remote> lookupRemote(git_repository *repository, const std::string &name)
+OwnedHandle<git_remote> lookupRemote(git_repository *repository, const char *name)
 {
-    return acquire<git_remote>(git_remote_lookup, repository, name.c_str()).value();
+    return acquire<git_remote>(git_remote_lookup, repository, name).value();
 }
 
 GitRemoteHead::Id copyId(const git_oid &id)
@@ -75,9 +76,10 @@ BasicGitRemote::~BasicGitRemote() = default;
 void BasicGitRemote::fetch(const std::vector<ustring> &refspecs)
 {
     const SigpipeGuard sigpipe;
-    const OwnedHandle<git_repository> repository = adapter_.getRepository();
-    const OwnedHandle<git_remote> remote = lookupRemote(repository.get(), name_);
+    const char *const name = asGitString(name_);
     const PathspecArray array = makeStringPathspec(refspecs);
+    const OwnedHandle<git_repository> repository = adapter_.getRepository();
+    const OwnedHandle<git_remote> remote = lookupRemote(repository.get(), name);
     const FetchOptions options = optionsFactory_->makeFetchOptions();
     const git_fetch_options record = toGitFetchOptions(options, *callbacks_);
     makeResult(git_remote_fetch(remote.get(), getArrayPointer(array), &record, nullptr)).value();
@@ -86,9 +88,10 @@ void BasicGitRemote::fetch(const std::vector<ustring> &refspecs)
 void BasicGitRemote::push(const std::vector<ustring> &refspecs)
 {
     const SigpipeGuard sigpipe;
-    const OwnedHandle<git_repository> repository = adapter_.getRepository();
-    const OwnedHandle<git_remote> remote = lookupRemote(repository.get(), name_);
+    const char *const name = asGitString(name_);
     const PathspecArray array = makeStringPathspec(refspecs);
+    const OwnedHandle<git_repository> repository = adapter_.getRepository();
+    const OwnedHandle<git_remote> remote = lookupRemote(repository.get(), name);
     const PushOptions options = optionsFactory_->makePushOptions();
     const git_push_options record = toGitPushOptions(options, *callbacks_);
     makeResult(git_remote_push(remote.get(), getArrayPointer(array), &record)).value();
@@ -97,8 +100,9 @@ void BasicGitRemote::push(const std::vector<ustring> &refspecs)
 std::vector<GitRemoteHead> BasicGitRemote::getRemoteHeads() const
 {
     const SigpipeGuard sigpipe;
+    const char *const name = asGitString(name_);
     const OwnedHandle<git_repository> repository = adapter_.getRepository();
-    const OwnedHandle<git_remote> remote = lookupRemote(repository.get(), name_);
+    const OwnedHandle<git_remote> remote = lookupRemote(repository.get(), name);
     const ProxyOptions options = optionsFactory_->makeProxyOptions();
     const git_remote_callbacks callbacks = toGitRemoteCallbacks(callbacks_->remoteCallbacks());
     const git_proxy_options proxy = toGitProxyOptions(options, callbacks_->proxyCallbacks());

@@ -13,6 +13,7 @@
 #include <git2/repository.h>
 
 #include "error/errorUtil/GitResult.hpp"
+#include "error/errorUtil/gitString.hpp"
 #include "error/errorUtil/rethrowAsGitException.hpp"
 #include "error/logging/logger.hpp"
 #include "error/raise.hpp"
@@ -52,6 +53,7 @@ void BranchMerger::performMerge(const BranchName &name)
 {
     try
     {
+        refuseNul(name);
         const OwnedHandle<git_repository> repository = adapter_.getRepository();
         decide(name, repository.get());
     }

@@ -6,6 +6,7 @@
 #include <git2/attr.h>
 
 #include "error/errorUtil/GitResult.hpp"
+#include "error/errorUtil/gitString.hpp"
 #include "fl/i18n/convert.hpp"
 #include "vclink/git/GitException.hpp"
 #include "vclink/git/messageIdentifiers.hpp"
@@ -47,9 +48,9 @@ GitAttributesImpl::~GitAttributesImpl() = default;
 
 GitAttribute GitAttributesImpl::getAttribute(const upath &path, const ustring &name)
 {
+    const std::string file = toGitString(path.string());
+    const std::string attribute = toGitString(name);
     const OwnedHandle<git_repository> repository = adapter_.getRepository();
-    const std::string file = fl::i18n::ustring_to_utf8(path.string());
-    const std::string attribute = fl::i18n::ustring_to_utf8(name);
     const char *value = nullptr;
     makeResult(git_attr_get(&value, repository.get(), GIT_ATTR_CHECK_FILE_THEN_INDEX, file.c_str(),
                             attribute.c_str()))

@@ -7,6 +7,7 @@
 #include <git2/config.h>
 
 #include "error/errorUtil/GitResult.hpp"
+#include "error/errorUtil/gitString.hpp"
 #include "fl/i18n/convert.hpp"
 #include "main/toolCommands.hpp"
 #include "scl/core/memory/make_unique_incomplete.hpp"
@@ -57,7 +58,7 @@ void write(git_config *config, const ToolCommand &tool)
 {
     const std::string key = configKeyString(tool.key);
     const std::string value = quotedCommand(toolLauncherPath(tool), tool.arguments);
-    makeResult(git_config_set_string(config, key.c_str(), value.c_str())).value();
+    makeResult(git_config_set_string(config, asGitString(key), asGitString(value))).value();
 }
 
 } // namespace

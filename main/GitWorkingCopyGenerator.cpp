@@ -7,6 +7,7 @@
 #include <git2/clone.h>
 
 #include "error/errorUtil/GitResult.hpp"
+#include "error/errorUtil/gitString.hpp"
 #include "error/logging/ScopeTrace.hpp"
 #include "error/logging/logger.hpp"
 #include "fl/i18n/convert.hpp"
@@ -55,8 +56,8 @@ void GitWorkingCopyGenerator::generate(const ustring &repositorySpecifier, const
         SeverityParameter,
         " repositorySpecifier=", [&] { return fl::i18n::to_string(repositorySpecifier); },
         " sandboxRoot.string()=", [&] { return fl::i18n::to_string(sandboxRoot.string()); });
-    const std::string url = fl::i18n::ustring_to_utf8(repositorySpecifier);
-    const std::string path = fl::i18n::ustring_to_utf8(sandboxRoot.string());
+    const std::string url = toGitString(repositorySpecifier);
+    const std::string path = toGitString(sandboxRoot.string());
     const CloneOptions options = impl_->optionsFactory->makeCloneOptions();
     const git_clone_options record = toGitCloneOptions(options, *impl_->callbacks);
     const SigpipeGuard sigpipe;

@@ -94,6 +94,7 @@ void GitAdapter::createCommit(git_repository *repository, const ustring &message
     const OwnedHandle<git_index> index = getRepositoryIndex(repository);
     refreshIndex(repository, index.get());
     writeIndex(index.get());
+    // To libgit2 it ends at its first NUL.
     const std::string text = fl::i18n::ustring_to_utf8(message);
     const git_oid treeId = writeIndexTree(index.get());
     const OwnedHandle<git_tree> tree = lookupTree(repository, &treeId);

@@ -2,6 +2,7 @@
 #include <git2/index.h>
 
 #include "error/errorUtil/GitResult.hpp"
+#include "error/errorUtil/gitString.hpp"
 #include "error/raise.hpp"
 #include "fl/filesystem/operations.hpp"
 #include "main/GitAdapter.hpp"
@@ -19,6 +20,14 @@ namespace
 int acceptAllPaths(const char * /*path*/, const char * /*matchedPathspec*/, void * /*adapter*/)
 {
     return 0;
+}
+
+void refuseNuls(const std::vector<upath> &files)
+{
+    for (const upath &file : files)
+    {
+        static_cast<void>(toGitString(file.string()));
+    }
 }
 
 } // namespace
@@ -73,6 +82,7 @@ void GitAdapter::addToIndex(const std::vector<upath> &files)
     {
         return;
     }
+    refuseNuls(files);
     const OwnedHandle<git_repository> repository = openRepository(root_);
     const OwnedHandle<git_index> index = getRepositoryIndex(repository.get());
     const PathspecArray pathspec = makeFilePathspec(files, root_);
@@ -88,6 +98,7 @@ void GitAdapter::removeFromIndex(const std::vector<upath> &files)
     {
         return;
     }
+    refuseNuls(files);
     const OwnedHandle<git_repository> repository = openRepository(root_);
     const OwnedHandle<git_index> index = getRepositoryIndex(repository.get());
     const PathspecArray pathspec = makeFilePathspec(files, root_);

@@ -7,6 +7,7 @@
 #include <git2/refs.h>
 
 #include "error/errorUtil/GitResult.hpp"
+#include "error/errorUtil/gitString.hpp"
 #include "error/logging/logger.hpp"
 #include "error/raise.hpp"
 #include "fl/i18n/convert.hpp"
@@ -112,7 +113,7 @@ void BranchMerger::threeWayMerge(const BranchName &name, git_repository *reposit
 void BranchMerger::commitMerge(const BranchName &name, git_repository *repository)
 {
     const bool isReference =
-        acquire<git_reference>(git_reference_dwim, repository, name.c_str()).has_value();
+        acquire<git_reference>(git_reference_dwim, repository, asGitString(name)).has_value();
     const std::string message = (isReference ? "Merge branch '" : "Merge commit '") + name + "'";
     vclink::CMAdapter &adapter = adapter_;
     adapter.commit(upath(), fl::i18n::utf8_to_ustring(message));

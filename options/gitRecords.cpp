@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "options/gitRecords.hpp"
 
+#include "error/errorUtil/gitString.hpp"
 #include "options/Callbacks.hpp"
 
 namespace vclink::git
@@ -85,7 +86,8 @@ git_clone_options toGitCloneOptions(const CloneOptions &options, GitCallbacks &c
     git_clone_options record =
         initGitRecord(git_clone_options_init, unsigned{GIT_CLONE_OPTIONS_VERSION});
     record.bare = options.bare ? 1 : 0;
-    record.checkout_branch = options.checkoutBranch ? options.checkoutBranch->c_str() : nullptr;
+    record.checkout_branch =
+        options.checkoutBranch ? asGitString(*options.checkoutBranch) : nullptr;
     record.checkout_opts =
         toGitCheckoutOptions(options.checkoutOptions, callbacks.checkoutCallbacks());
     record.fetch_opts = toGitFetchOptions(options.fetchOptions, callbacks);

@@ -5,6 +5,7 @@
 #include <iterator>
 #include <utility>
 
+#include "error/errorUtil/gitString.hpp"
 #include "fl/i18n/convert.hpp"
 #include "util/paths.hpp"
 #include "util/pathspecEscape.hpp"
@@ -40,7 +41,11 @@ PathspecArray::PathspecArray(std::vector<std::string> strings)
 {
     pointers_.reserve(strings_.size());
     std::transform(strings_.begin(), strings_.end(), std::back_inserter(pointers_),
-                   [](std::string &text) { return text.data(); });
+                   [](std::string &text)
+                   {
+                       refuseNul(text);
+                       return text.data();
+                   });
     if (!pointers_.empty())
     {
         array_ = {pointers_.data(), pointers_.size()};

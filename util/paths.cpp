@@ -9,6 +9,7 @@
 
 #include <boost/filesystem/operations.hpp>
 
+#include "error/errorUtil/gitString.hpp"
 #include "fl/filesystem/detail/path_text.hpp"
 #include "fl/i18n/convert.hpp"
 
@@ -104,13 +105,13 @@ void convertName(const char *name, ustring &converted)
 } // namespace
 
 RootRelativePaths::RootRelativePaths(const upath &root)
-    : given_(fl::i18n::ustring_to_utf8(root.string())), root_(canonical(given_))
+    : given_(toGitString(root.string())), root_(canonical(given_))
 {
 }
 
 std::string RootRelativePaths::relative(const upath &path)
 {
-    std::string text = resolve(fl::i18n::ustring_to_utf8(path.string()));
+    std::string text = resolve(toGitString(path.string()));
     std::replace(text.begin(), text.end(), '\\', '/');
     return text;
 }

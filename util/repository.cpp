@@ -7,8 +7,8 @@
 #include <git2.h>
 #include <sys/stat.h>
 
+#include "error/errorUtil/gitString.hpp"
 #include "error/errorUtil/raiseSystemError.hpp"
-#include "fl/i18n/convert.hpp"
 
 namespace vclink::git
 {
@@ -55,7 +55,7 @@ bool hasMergeHead(git_repository *repository)
 
 bool isRepository(const upath &path)
 {
-    const std::string folder = fl::i18n::ustring_to_utf8(path.string());
+    const std::string folder = toGitString(path.string());
     const GitResult<void> probe = makeResult(
         git_repository_open_ext(nullptr, folder.c_str(), GIT_REPOSITORY_OPEN_NO_SEARCH, nullptr));
     if (probe.has_error() && probe.error().getCode() == GIT_ENOTFOUND)
@@ -68,7 +68,7 @@ bool isRepository(const upath &path)
 
 OwnedHandle<git_repository> openRepository(const upath &root)
 {
-    const std::string folder = fl::i18n::ustring_to_utf8(root.string());
+    const std::string folder = toGitString(root.string());
     return acquire<git_repository>(git_repository_open_ext, folder.c_str(),
                                    GIT_REPOSITORY_OPEN_NO_SEARCH, nullptr)
         .value();
@@ -127,7 +127,7 @@ OwnedHandle<git_tree> lookupTree(git_repository *repository, const git_oid *id)
 GitResult<OwnedHandle<git_object>> revparseObject(git_repository *repository,
                                                   const std::string &spec)
 {
-    return acquire<git_object>(git_revparse_single, repository, spec.c_str());
+    return acquire<git_object>(git_revparse_single, repository, asGitString(spec));
 }
 
 const git_oid *revparseId(const std::string &spec, git_repository *repository)

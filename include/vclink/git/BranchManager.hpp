@@ -20,7 +20,8 @@ namespace vclink::git
 /// at a time, as its adapter.
 ///
 /// Unless an operation says otherwise it throws LibGit2Exception, with libgit2's text, when a call
-/// to libgit2 fails, and nothing has changed then. The order of the operations is binding.
+/// to libgit2 fails, and nothing has changed then. A name or revision with a NUL character is
+/// refused with GIT_EINVALIDSPEC before anything is opened. The order of the operations is binding.
 class VCLINK_GIT_EXPORT BranchManager
 {
   public:

@@ -35,7 +35,8 @@ class VCLINK_GIT_EXPORT GitAdapterFactory : public vclink::CMAdapterFactory
     /// lies outside the working copy, or that Git does not know, matches nothing; the characters
     /// '*', '?' and '[' in a name act as patterns; a symbolic link means its target, one that leads
     /// nowhere itself; a folder means all below it. boost::filesystem::filesystem_error comes of a
-    /// path that can't be resolved.
+    /// path that can't be resolved. A path with a NUL character, also in the root, is refused with
+    /// GIT_EINVALIDSPEC before anything is opened.
     ///
     /// What the adapter carries out:
     /// - getFileStates: the states of the files named, one walk for the whole list. A file that Git
@@ -95,7 +96,7 @@ class VCLINK_GIT_EXPORT GitAdapterFactory : public vclink::CMAdapterFactory
     /// be opened, and belongs to the user, shows at an adapter's first operation. Holds a
     /// LibGit2Guard for the call. git_repository_open_ext.
     /// @throws LibGit2Exception when that can't be found out, e.g. for lack of permission to enter
-    /// a folder above it
+    /// a folder above it; with GIT_EINVALIDSPEC for a path with a NUL character
     bool isAdapterFor(const upath &path) const override;
 
     /// "git".

@@ -32,7 +32,8 @@ class VCLINK_GIT_EXPORT GitAttributes
     /// nothing behind it counts as set. git_attr_get.
     /// @param path relative to the root of the working tree; the file need not exist
     /// @param name the attribute's name
-    /// @throws LibGit2Exception; GitException with the message
+    /// @throws LibGit2Exception, with GIT_EINVALIDSPEC for a path or name with a NUL character;
+    /// GitException with the message
     /// shared_vclink::git::InvalidGitAttributeValue for an answer of an unknown kind
     virtual GitAttribute getAttribute(const upath &path, const ustring &name) = 0;
 };

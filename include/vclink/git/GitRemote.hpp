@@ -26,6 +26,8 @@ namespace vclink::git
 ///
 /// Each operation throws LibGit2Exception, with libgit2's text, when a call to libgit2 fails: a
 /// name that the repository does not know, a remote that can't be reached or that refuses access.
+/// A name or refspec with a NUL character is refused with GIT_EINVALIDSPEC before anything is
+/// opened.
 /// Meanwhile SIGPIPE is blocked for the calling thread, so that a broken connection is such a
 /// failure too. The order of the operations is binding.
 class VCLINK_GIT_EXPORT GitRemote
