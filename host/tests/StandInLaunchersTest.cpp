@@ -2,10 +2,9 @@
 // The tools that the stand-in ships at the place below the installation that is agreed on.
 #include <array>
 #include <cstdio>
+#include <filesystem>
 #include <string>
 
-#include <boost/filesystem/directory.hpp>
-#include <boost/filesystem/operations.hpp>
 #include <gtest/gtest.h>
 #include <sys/wait.h>
 
@@ -41,7 +40,7 @@ class StandInLaunchers : public testing::Test
   protected:
     StandInLaunchers()
     {
-        boost::filesystem::create_directory(temporary_);
+        std::filesystem::create_directory(temporary_);
     }
 
     /// Runs a launcher with files of the folder as its arguments.
@@ -70,7 +69,7 @@ class StandInLaunchers : public testing::Test
     }
     bool nothingIsLeft() const
     {
-        return boost::filesystem::is_empty(temporary_);
+        return std::filesystem::is_empty(temporary_);
     }
 
     const TemporaryFolder folder_;
@@ -86,10 +85,10 @@ TEST_F(StandInLaunchers, CanBeExecuted)
 {
     for (const auto *name : {"vkAutoMerge.sh", "vkMerge", "vkDiff"})
     {
-        const auto status = boost::filesystem::status(launcher(name));
-        EXPECT_TRUE(boost::filesystem::is_regular_file(status)) << name;
-        EXPECT_EQ(status.permissions() & boost::filesystem::others_exe,
-                  boost::filesystem::others_exe)
+        const auto status = std::filesystem::status(launcher(name));
+        EXPECT_TRUE(std::filesystem::is_regular_file(status)) << name;
+        EXPECT_EQ(status.permissions() & std::filesystem::perms::others_exec,
+                  std::filesystem::perms::others_exec)
             << name;
     }
 }
@@ -178,9 +177,9 @@ TEST_F(StandInLaunchers, WantTheirNumberOfArguments)
 TEST_F(StandInLaunchers, WorkBelowAFolderWithABlank)
 {
     const std::string copy = folder_.file("my host");
-    boost::filesystem::create_directory(copy);
+    std::filesystem::create_directory(copy);
     for (const auto *name : {"vkAutoMerge.sh", "vkMerge"})
-        boost::filesystem::copy_file(launcher(name), copy + '/' + name);
+        std::filesystem::copy_file(launcher(name), copy + '/' + name);
     writeSides("ours\n2\n3\n4\n5\n", "1\n2\n3\n4\ntheirs\n");
     EXPECT_EQ(run(copy + "/vkMerge", "base", "ours", "theirs", "a new file").status, 0);
     EXPECT_EQ(read("a new file"), clean);

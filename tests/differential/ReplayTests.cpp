@@ -340,9 +340,10 @@ TEST_F(MergeHistories, HoldMergesOfEveryKindAndSeveralMergeBases)
 TEST_F(MergeHistories, DependOnTheSeedAlone)
 {
     std::set<std::string> tips;
+    int number = 0;
     for (const auto seed : {usualSeed, usualSeed, usualSeed + 1})
     {
-        const auto repository = makeRepository(std::to_string(tips.size()));
+        const auto repository = makeRepository(std::to_string(++number));
         MergeHistory(seed, 20).importInto(repository);
         tips.insert(repository.git({"for-each-ref"}));
     }
