@@ -50,8 +50,12 @@ std::string contentOf(const fs::directory_entry &entry)
     if (entry.is_symlink())
         return "link to " + fs::read_symlink(entry.path()).string();
     std::ostringstream text;
-    text << std::oct << static_cast<unsigned>(entry.status().permissions()) << ' '
-         << (entry.is_directory() ? "folder" : shortened(readIfPossible(entry.path())));
+    text << std::oct << static_cast<unsigned>(entry.status().permissions()) << ' ';
+    // Nobody reads a FIFO: that waits for a writer.
+    if (entry.is_other())
+        text << "special file " << static_cast<int>(entry.status().type());
+    else
+        text << (entry.is_directory() ? "folder" : shortened(readIfPossible(entry.path())));
     return text.str();
 }
 
