@@ -14,7 +14,7 @@
 #include "error/logging/ScopeTrace.hpp"
 #include "error/logging/logger.hpp"
 #include "main/BranchMerger.hpp"
-#include "main/SafeLinkGuard.hpp"
+#include "main/checkout/CheckoutWatch.hpp"
 #include "options/gitRecords.hpp"
 #include "util/repository.hpp"
 
@@ -102,7 +102,8 @@ void BasicBranchManager::switchBranch(const BranchName &name)
     const OwnedHandle<git_object> target = revparseObject(repository.get(), name).value();
     const CheckoutOptions options = optionsFactory_->makeCheckoutOptions();
     git_checkout_options record = toGitCheckoutOptions(options, callbacks_->checkoutCallbacks());
-    SafeLinkGuard links(repository.get(), target.get(), record);
+    CheckoutWatch watch(CheckoutKind::Switch, repository.get(), record);
+    watch.lookBeforeSwitch(target.get());
     makeResult(git_checkout_tree(repository.get(), target.get(), &record)).value();
     // Only now, so that a checkout that fails leaves HEAD where it was.
     makeResult(git_repository_set_head(repository.get(), git_reference_name(branch.get()))).value();

@@ -17,7 +17,7 @@
 #include "error/errorUtil/rethrowAsGitException.hpp"
 #include "error/logging/logger.hpp"
 #include "error/raise.hpp"
-#include "main/SafeLinkGuard.hpp"
+#include "main/checkout/CheckoutWatch.hpp"
 #include "options/gitRecords.hpp"
 #include "util/repository.hpp"
 #include "vclink/git/messageIdentifiers.hpp"
@@ -112,7 +112,8 @@ void BranchMerger::fastForward(git_repository *repository, git_annotated_commit 
     CheckoutOptions options = optionsFactory_->makeCheckoutOptions();
     options.checkoutStrategy = GIT_CHECKOUT_SAFE;
     git_checkout_options record = toGitCheckoutOptions(options, callbacks_->checkoutCallbacks());
-    SafeLinkGuard links(repository, target.get(), record);
+    CheckoutWatch watch(CheckoutKind::Switch, repository, record);
+    watch.lookBeforeSwitch(target.get());
     makeResult(git_checkout_tree(repository, target.get(), &record)).value();
     // Only now, so that a checkout that fails leaves the branch where it was.
     acquire<git_reference>(git_reference_set_target, head.get(), id, nullptr).value();

@@ -10,8 +10,8 @@
 #include "error/errorUtil/GitResult.hpp"
 #include "error/raise.hpp"
 #include "fl/i18n/convert.hpp"
-#include "main/ForceLinkGuard.hpp"
 #include "main/GitAdapter.hpp"
+#include "main/checkout/CheckoutWatch.hpp"
 #include "options/gitRecords.hpp"
 #include "util/PathspecArray.hpp"
 #include "util/repository.hpp"
@@ -110,7 +110,7 @@ void GitAdapter::revertFiles(const std::vector<upath> &files)
     options.checkoutStrategy = GIT_CHECKOUT_FORCE | GIT_CHECKOUT_RECREATE_MISSING;
     git_checkout_options record = toGitCheckoutOptions(options, callbacks_->checkoutCallbacks());
     record.paths = getArray(pathspec);
-    ForceLinkGuard links(repository.get(), record);
+    const CheckoutWatch watch(CheckoutKind::Revert, repository.get(), record);
     makeResult(git_checkout_index(repository.get(), nullptr, &record)).value();
 }
 

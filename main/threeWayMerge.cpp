@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: MIT
+#include <git2/annotated_commit.h>
 #include <git2/attr.h>
 #include <git2/checkout.h>
 #include <git2/errors.h>
@@ -12,7 +13,7 @@
 #include "error/raise.hpp"
 #include "fl/i18n/convert.hpp"
 #include "main/BranchMerger.hpp"
-#include "main/ForceLinkGuard.hpp"
+#include "main/checkout/CheckoutWatch.hpp"
 #include "options/gitRecords.hpp"
 #include "util/PathspecArray.hpp"
 #include "util/pathspecEscape.hpp"
@@ -100,7 +101,8 @@ void BranchMerger::threeWayMerge(const BranchName &name, git_repository *reposit
         toGitCheckoutOptions(options, callbacks_->checkoutCallbacks());
     const git_merge_options mergeRecord = toGitMergeOptions(mergeOptions);
     const git_annotated_commit *heads[] = {theirs};
-    ForceLinkGuard links(repository, checkoutRecord);
+    CheckoutWatch watch(CheckoutKind::Merge, repository, checkoutRecord);
+    watch.lookBeforeMerge(git_annotated_commit_id(theirs));
     makeResult(git_merge(repository, heads, 1, &mergeRecord, &checkoutRecord)).value();
     const OwnedHandle<git_index> index = getRepositoryIndex(repository);
     if (git_index_has_conflicts(index.get()) != 0)

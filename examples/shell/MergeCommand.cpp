@@ -29,8 +29,8 @@ bool isInOrder(const git::BranchManager &manager)
     return manager.getRepositoryState() == "Normal";
 }
 
-/// Whether a merge by force puts such a file back. Unknown is also what a link is that has taken a
-/// file's place.
+/// Whether a merge may put such a file back, or is refused for it. Unknown is also what a link is
+/// that has taken a file's place.
 bool isPutBack(FileState::State state)
 {
     return state == FileState::Modified || state == FileState::Missing ||
@@ -46,8 +46,8 @@ class MergeCommand : public Command
                             "A branch, or any revision of a commit, e.g. v1^{commit} for a tag")
                     ->required();
         line.add_flag("--force", loses_,
-                      "Merge over modified and missing files, which may be put back as they are\n"
-                      "in the last commit");
+                      "Merge beside modified and missing files: missing ones come back, and the\n"
+                      "merge is refused if it would lose changes");
         line.footer("Brings the changes of another branch into the current one. Tells what came of "
                     "it: \"Already up to\n"
                     "date.\", a fast-forward, or a merge commit. Files that are given to a merge "
@@ -95,10 +95,10 @@ class MergeCommand : public Command
         {
             throw ShellFailure(
                 "Nothing was merged. These files are changed, and a merge could put them back as "
-                "they are in\nthe last commit:" +
+                "they are in\nthe last commit, or be refused:" +
                 listNames(changed, root) +
                 "\nCommit the changes first, or throw them away with \"vclink-shell revert\". With "
-                "--force the merge\nis tried over them.");
+                "--force the merge\nis tried beside them.");
         }
     }
 

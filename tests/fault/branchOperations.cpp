@@ -106,6 +106,11 @@ std::vector<Operation> branchOperations()
 {
     const std::vector<std::vector<std::string>> abort{{"reset", "--quiet", "--hard"},
                                                       {"clean", "--quiet", "--force"}};
+    // What is marked is not put back.
+    const std::vector<std::vector<std::string>> abortHidden{
+        {"update-index", "--no-skip-worktree", "link", "sub/inside"},
+        {"reset", "--quiet", "--hard"},
+        {"update-index", "--skip-worktree", "link", "sub/inside"}};
     const std::string badState = "vclink::git::GitException";
     const std::string refused = "vclink::git::LibGit2Exception";
     return {
@@ -122,6 +127,8 @@ std::vector<Operation> branchOperations()
         {"mergeUpToDate", makeUpToDate, doing(merge)},
         {"mergeFastForward", makeBranches, doing(merge), badState, abort},
         {"mergeThreeWay", makeDiverged, doing(merge), badState, abort},
+        {"mergeBesideHidden", makeHidden, doing(merge), badState, abortHidden},
+        {"mergeOverIgnored", makeIgnored, doing(merge), badState, abort},
         {"mergeConflict", makeConflict, doing(merge), badState, abort},
         {"mergeUnmergeable", makeUnmergeableConflict, doing(merge), badState, abort},
         {"mergeByTool", makeConflictForTool, doing(merge), badState, abort},

@@ -135,8 +135,6 @@ std::vector<Tolerance> tolerancesOfOthers(const std::string &operation, const st
     const std::string hasConflicts = mergeFailure(textOf(shared_vclink::git::HasConflicts()));
     const std::string badState =
         mergeFailure(textOf(shared_vclink::git::UnableToMergeBadRepositoryState()));
-    const std::string linkInTheWay = failure(
-        GIT_ECONFLICT, GIT_ERROR_CHECKOUT, "the symbolic link 'sub' is in the way of the checkout");
     return {
         // Only a missing folder is no failure of a probe.
         {"isAdapterFor", "git_repository_open_ext", any, GIT_ENOTFOUND, "done: 0"},
@@ -149,20 +147,20 @@ std::vector<Tolerance> tolerancesOfOthers(const std::string &operation, const st
         {"getRemoteBranches", "git_branch_next", 1, GIT_ITEROVER, "done: "},
         {"getRemoteBranches", "git_branch_next", 2, GIT_ITEROVER, normal},
         {"merge", "git_index_conflict_next", any, GIT_ITEROVER, normal},
-        // A link is in the way where it is not known that the folder behind it stays.
-        {"switchBranchUnderLink", "git_revparse_single", 2, any, linkInTheWay},
-        {"switchBranchUnderLink", "git_revparse_single", 3, any, linkInTheWay},
-        {"switchBranchUnderLink", "git_oid_equal", any, any, normal},
+        // A name that HEAD does not have, and histories without a common commit.
+        {"merge", "git_tree_entry_bypath", any, GIT_ENOTFOUND, normal},
+        {"merge", "git_merge_bases", any, GIT_ENOTFOUND, normal},
         // A state without a name.
         {"getRepositoryState", "git_repository_state", any, any, "done: "},
         // Any state but the normal one refuses the merge, any answer but no means conflicts.
         {"merge", "git_repository_state", 1, any, badState},
         {"merge", "git_repository_state", 2, any, normal},
         {"merge", "git_index_has_conflicts", any, any, hasConflicts},
-        // The first look-up chooses the words of the message, the second is the commit's.
+        // The first look-up chooses the words of the message, the second is the commit's, after
+        // those of the look before the merge.
         {"merge", "git_reference_dwim", 1, any, normal},
         {"merge", "git_reference_dwim", 2, any, isOtherTip},
-        {"merge", "git_commit_lookup", 1, any, isOtherTip},
+        {"merge", "git_commit_lookup", 3, any, isOtherTip},
         // Without its command a driver leaves the file to libgit2's own merge.
         {"mergeByTool", "git_config_get_entry", any, any, hasConflicts},
         // No value is what the reads of the configuration make of every failure.

@@ -130,6 +130,27 @@ void makeDiverged(GitRepository &repository)
     repository.commitAll("on main");
 }
 
+void makeHidden(GitRepository &repository)
+{
+    makePlain(repository);
+    repository.symlink("file", "link");
+    repository.commitAll("link");
+    repository.git({"checkout", "--quiet", "-b", "topic"});
+    repository.write("sub/inside", "theirs\n");
+    repository.commitAll("on topic");
+    repository.git({"checkout", "--quiet", "main"});
+    repository.write("other", "ours\n");
+    repository.commitAll("on main");
+    repository.git({"update-index", "--skip-worktree", "link", "sub/inside"});
+}
+
+void makeIgnored(GitRepository &repository)
+{
+    makeDiverged(repository);
+    repository.write(".git/info/exclude", "added\n");
+    repository.write("added/ignored", "x");
+}
+
 void makeMerging(GitRepository &repository)
 {
     makeDiverged(repository);

@@ -34,6 +34,10 @@ void makeLinkedFolder(GitRepository &repository);
 void makeUpToDate(GitRepository &repository);
 /// Branches, with another change of other files on main.
 void makeDiverged(GitRepository &repository);
+/// Diverged, and files that are marked skip-worktree, unchanged; "topic" changes one of them.
+void makeHidden(GitRepository &repository);
+/// Diverged, and an ignored folder where "topic" adds a file.
+void makeIgnored(GitRepository &repository);
 /// Diverged, and stopped in a merge without conflicts.
 void makeMerging(GitRepository &repository);
 /// Main and topic change the same line of "file", for which there is no tool.

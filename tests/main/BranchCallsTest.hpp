@@ -52,8 +52,31 @@ class BranchCallsTest : public MergeTest
         EXPECT_EQ(record.baseline, nullptr);
         EXPECT_EQ(record.target_directory, nullptr);
         EXPECT_EQ(record.disable_filters, 0);
-        EXPECT_EQ(record.file_open_flags, O_CREAT | O_TRUNC | O_WRONLY | O_NOFOLLOW);
+        EXPECT_EQ(record.file_open_flags, O_CREAT | O_TRUNC | O_WRONLY | O_NOFOLLOW | O_NONBLOCK);
     }
+
+    static Calls joined(const std::vector<Calls> &parts)
+    {
+        Calls all;
+        for (const auto &part : parts)
+            all.insert(all.end(), part.begin(), part.end());
+        return all;
+    }
+    /// What looks at the working copy before a checkout, and releases afterwards what it held.
+    const Calls openingTheLook_{"git_repository_index", "git_repository_head",
+                                "git_reference_peel",   "git_tree_lookup",
+                                "git_object_free",      "git_reference_free"};
+    const Calls lookBeforeASwitch_ =
+        joined({openingTheLook_,
+                {"git_object_peel", "git_tree_lookup", "git_tree_free", "git_object_free"}});
+    const Calls lookingUpATree_{"git_commit_lookup", "git_commit_tree", "git_commit_free"};
+    const Calls lookBeforeAMerge_ = joined({openingTheLook_,
+                                            {"git_reference_name_to_id"},
+                                            lookingUpATree_,
+                                            {"git_merge_bases"},
+                                            lookingUpATree_,
+                                            {"git_tree_free", "git_tree_free"}});
+    const Calls endOfTheLook_{"git_tree_free", "git_index_free"};
 
     const LibGit2Failure injected_{GIT_ERROR, GIT_ERROR_OS, injectedText};
     /// The records of git_checkout_tree, git_checkout_index and git_merge, in order, and their

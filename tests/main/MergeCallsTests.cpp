@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 // The calls to libgit2 of a merge.
 #include <algorithm>
+#include <cstddef>
 #include <cstdint>
 #include <iterator>
 #include <string>
@@ -91,14 +92,16 @@ TEST_F(CallsOfAMerge, OfAFastForwardAreTheseInOrder)
         [](git_reference **, git_reference *, const git_oid *, const char *message)
         { EXPECT_EQ(message, nullptr) << "and nothing for the reflog"; });
     merge("topic");
-    EXPECT_THAT(calls.steps(),
-                ElementsAre("git_repository_open_ext", "git_repository_state",
-                            "git_revparse_single", "git_oid_cpy", "git_object_free",
-                            "git_annotated_commit_lookup", "git_merge_analysis",
-                            "git_repository_head", "git_object_lookup", "git_checkout_options_init",
-                            "git_checkout_tree", "git_reference_set_target", "git_reference_free",
-                            "git_object_free", "git_reference_free", "git_annotated_commit_free",
-                            "git_repository_free"));
+    EXPECT_EQ(calls.steps(),
+              joined({{"git_repository_open_ext", "git_repository_state", "git_revparse_single",
+                       "git_oid_cpy", "git_object_free", "git_annotated_commit_lookup",
+                       "git_merge_analysis", "git_repository_head", "git_object_lookup",
+                       "git_checkout_options_init"},
+                      lookBeforeASwitch_,
+                      {"git_checkout_tree", "git_reference_set_target", "git_reference_free"},
+                      endOfTheLook_,
+                      {"git_object_free", "git_reference_free", "git_annotated_commit_free",
+                       "git_repository_free"}}));
     ASSERT_THAT(checkouts_, SizeIs(1));
     expectCheckoutRecord(checkouts_[0], 1);
     EXPECT_THAT(checkoutPaths_[0], IsEmpty());
@@ -111,7 +114,8 @@ TEST_F(CallsOfAMerge, OfAFastForwardFailTheMergeWhenTheyFail)
         const NothingChanges nothing(repository_);
         expectEachFailsTheMerge({"git_repository_open_ext", "git_revparse_single",
                                  "git_annotated_commit_lookup", "git_repository_head",
-                                 "git_object_lookup", "git_checkout_tree"});
+                                 "git_object_lookup", "git_repository_index", "git_reference_peel",
+                                 "git_tree_lookup", "git_object_peel", "git_checkout_tree"});
     }
     const std::string main = idOf("main");
     expectEachFailsTheMerge({"git_reference_set_target"});
@@ -173,18 +177,21 @@ TEST_F(CallsOfAMerge, OfACleanMergeAreTheseInOrder)
     LibGit2Recorder calls;
     collectRecords(calls);
     merge("topic");
-    ASSERT_GE(calls.steps().size(), 15U);
-    const Calls first(calls.steps().begin(), calls.steps().begin() + 15);
-    EXPECT_THAT(first,
-                ElementsAre("git_repository_open_ext", "git_repository_state",
-                            "git_revparse_single", "git_oid_cpy", "git_object_free",
-                            "git_annotated_commit_lookup", "git_merge_analysis",
-                            "git_checkout_options_init", "git_merge_options_init", "git_merge",
-                            "git_repository_index", "git_index_has_conflicts", "git_reference_dwim",
-                            "git_reference_free", "git_repository_open_ext"));
-    const Calls last(calls.steps().end() - 3, calls.steps().end());
-    EXPECT_THAT(last,
-                ElementsAre("git_index_free", "git_annotated_commit_free", "git_repository_free"));
+    const Calls expected =
+        joined({{"git_repository_open_ext", "git_repository_state", "git_revparse_single",
+                 "git_oid_cpy", "git_object_free", "git_annotated_commit_lookup",
+                 "git_merge_analysis", "git_checkout_options_init", "git_merge_options_init"},
+                lookBeforeAMerge_,
+                {"git_merge", "git_repository_index", "git_index_has_conflicts",
+                 "git_reference_dwim", "git_reference_free", "git_repository_open_ext"}});
+    ASSERT_GE(calls.steps().size(), expected.size());
+    const auto size = static_cast<std::ptrdiff_t>(expected.size());
+    const Calls first(calls.steps().begin(), calls.steps().begin() + size);
+    EXPECT_EQ(first, expected);
+    const Calls last(calls.steps().end() - 5, calls.steps().end());
+    EXPECT_EQ(last, joined({{"git_index_free"},
+                            endOfTheLook_,
+                            {"git_annotated_commit_free", "git_repository_free"}}));
     ASSERT_THAT(checkouts_, SizeIs(1));
     expectCheckoutRecord(checkouts_[0], 18);
     EXPECT_THAT(checkoutPaths_[0], IsEmpty());
@@ -196,14 +203,20 @@ TEST_F(CallsOfAMerge, OfACleanMergeFailItWhenTheyFail)
     makeDiverged();
     const NothingChanges nothing(repository_);
     expectEachFailsTheMerge({"git_repository_open_ext", "git_revparse_single",
-                             "git_annotated_commit_lookup", "git_merge"});
+                             "git_annotated_commit_lookup", "git_repository_index",
+                             "git_repository_head", "git_reference_peel", "git_tree_lookup",
+                             "git_reference_name_to_id", "git_merge_bases", "git_merge"});
 }
 
 TEST_F(CallsOfAMerge, OfTheIndexFailTheMergeThatStandsByThen)
 {
     makeDiverged();
     const std::string head = idOf("HEAD");
-    expectEachFailsTheMerge({"git_repository_index"});
+    {
+        LibGit2Recorder calls;
+        calls.fail({{"git_repository_index", GIT_ERROR, 2}});
+        EXPECT_EQ(failureOfMerge("topic"), textOf(injected_));
+    }
     EXPECT_EQ(idOf("HEAD"), head);
     EXPECT_EQ(idOf("MERGE_HEAD"), idOf("topic"));
     EXPECT_EQ(branches().getRepositoryState(), "Conflicts");
@@ -223,11 +236,11 @@ TEST_F(CallsOfAMerge, OfConflictsAreTheseInOrder)
     Calls others;
     std::copy_if(begin, end, std::back_inserter(others),
                  [](const std::string &name) { return name.rfind("git_attr_", 0) != 0; });
-    EXPECT_THAT(others,
-                ElementsAre("git_index_has_conflicts", "git_index_conflict_iterator_new",
-                            "git_index_conflict_next", "git_index_conflict_next",
-                            "git_index_conflict_next", "git_index_conflict_iterator_free",
-                            "git_checkout_index", "git_index_free", "git_annotated_commit_free"));
+    EXPECT_THAT(others, ElementsAre("git_index_has_conflicts", "git_index_conflict_iterator_new",
+                                    "git_index_conflict_next", "git_index_conflict_next",
+                                    "git_index_conflict_next", "git_index_conflict_iterator_free",
+                                    "git_checkout_index", "git_index_free", "git_tree_free",
+                                    "git_index_free", "git_annotated_commit_free"));
 }
 
 TEST_F(CallsOfAMerge, OfTheSecondCheckoutTakeTheFirstOnesRecordAndOurs)

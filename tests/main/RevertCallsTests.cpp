@@ -209,7 +209,7 @@ TEST_F(RevertCalls, CheckOutWithTheAdaptersCallbacks)
     EXPECT_EQ(records_[0].disable_filters, 0);
 }
 
-/// What keeps the checkout from writing through links stands before them.
+/// What watches over the checkout is asked after them.
 TEST_F(RevertCalls, PassTheNotificationsOnToTheAdaptersCallbacks)
 {
     revert({"file"});
@@ -220,11 +220,11 @@ TEST_F(RevertCalls, PassTheNotificationsOnToTheAdaptersCallbacks)
     EXPECT_THROW(revert({"file"}), vclink::util::exception::CancelledOperationException);
 }
 
-TEST_F(RevertCalls, WriteThroughNoLink)
+TEST_F(RevertCalls, WriteThroughNoLinkAndWaitForNoFifo)
 {
     revert({"file"});
     ASSERT_EQ(records_.size(), 1U);
-    EXPECT_EQ(records_[0].file_open_flags, O_CREAT | O_TRUNC | O_WRONLY | O_NOFOLLOW);
+    EXPECT_EQ(records_[0].file_open_flags, O_CREAT | O_TRUNC | O_WRONLY | O_NOFOLLOW | O_NONBLOCK);
 }
 
 TEST_F(RevertCalls, AskTheFactoryOnceAndHoldAShareOfIt)

@@ -137,7 +137,11 @@ TEST_F(RefusedThreeWayMerge, KeepsAStagedEditOfAnotherFile)
 TEST_F(RefusedThreeWayMerge, KeepsAnUntrackedFileInTheWay)
 {
     repository_.write("new", "mine\n");
-    expectRefused();
+    EXPECT_FALSE(makeTwin().tryGit({"merge", "--quiet", "--no-edit", "topic"}).succeeded());
+    const vclink::test::NothingChanges nothing(repository_);
+    EXPECT_EQ(failureOfMerge("topic"),
+              textOf(LibGit2Failure{GIT_ECONFLICT, GIT_ERROR_CHECKOUT,
+                                    "the untracked file 'new' is in the way of the checkout"}));
 }
 
 } // namespace

@@ -11,17 +11,18 @@ namespace
 using testing::HasSubstr;
 using testing::StartsWith;
 
-/// A merge by force puts back files that are modified or missing, without a word.
+/// A merge puts back missing files without a word, and the back end names the first changed one
+/// only.
 class ShellMergeOverChanges : public ShellMergeTest
 {
   protected:
     static std::string refusal(const std::string &names)
     {
         return "Nothing was merged. These files are changed, and a merge could put them back as "
-               "they are in\nthe last commit:\n" +
+               "they are in\nthe last commit, or be refused:\n" +
                names +
                "Commit the changes first, or throw them away with \"vclink-shell revert\". With "
-               "--force the merge\nis tried over them.\n";
+               "--force the merge\nis tried beside them.\n";
     }
 };
 
@@ -66,13 +67,16 @@ TEST_F(ShellMergeOverChanges, GoesOnWhereNothingIsLost)
     EXPECT_EQ(repository_.read("untracked"), "untracked\n");
 }
 
-TEST_F(ShellMergeOverChanges, PutsThemBackByForce)
+TEST_F(ShellMergeOverChanges, BringsMissingFilesBackByForceButLosesNoChange)
 {
     diverge();
     repository_.write("folder/c", "edited\n");
     repository_.remove("folder/deep/d");
+    EXPECT_THAT(fail({"merge", "--force", "other"}),
+                HasSubstr("the uncommitted changes of 'folder/c' would be lost in the merge"));
+    EXPECT_EQ(repository_.read("folder/c"), "edited\n");
+    repository_.git({"checkout", "folder/c"});
     EXPECT_THAT(run({"merge", "--force", "other"}).output, StartsWith("Merge commit "));
-    EXPECT_EQ(repository_.read("folder/c"), "folder/c\n");
     EXPECT_EQ(repository_.read("folder/deep/d"), "folder/deep/d\n");
     EXPECT_EQ(repository_.git({"status", "--porcelain"}), "");
 }

@@ -66,8 +66,9 @@ class VCLINK_GIT_EXPORT GitAdapterFactory : public vclink::CMAdapterFactory
     ///   when the state can't be cleaned up does the commit stand.
     ///   git_index_update_all, git_commit_create, git_repository_state_cleanup.
     /// - revertFiles: throws away all changes to the files, staged or not, and brings back missing
-    ///   ones; a file that HEAD does not have leaves the index and stays on the disk. What stands
-    ///   in the way of a file goes, a symbolic link included. Raises the exception of
+    ///   ones; a file that HEAD does not have leaves the index and stays on the disk. As in git,
+    ///   what is in the place of a listed file is deleted, including a folder with all its content;
+    ///   symbolic links, FIFOs, sockets and devices are replaced. Raises the exception of
     ///   shared_vclink::git::Conflicted, which names them, when some are in conflict; nothing is
     ///   changed then. Reports progress, and ends with
     ///   vclink::util::exception::CancelledOperationException when the application asks for it

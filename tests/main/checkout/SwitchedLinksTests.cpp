@@ -7,7 +7,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "SwitchBranchTest.hpp"
+#include "../SwitchBranchTest.hpp"
 #include "support/text.hpp"
 #include "vclink/util/exception/CancelledOperationException.hpp"
 
@@ -25,10 +25,10 @@ using vclink::util::exception::CancelledOperationException;
 
 /// "main" with the folder "dir", of which the test makes a link to a folder outside that holds the
 /// same names, and branches that change it.
-class SafeLinkGuard : public vclink::test::SwitchBranchTest
+class SwitchedLinks : public vclink::test::SwitchBranchTest
 {
   protected:
-    SafeLinkGuard()
+    SwitchedLinks()
     {
         for (const auto *name : {"dir/a", "dir/b", "dir/deep/c"})
         {
@@ -69,7 +69,7 @@ class SafeLinkGuard : public vclink::test::SwitchBranchTest
     }
 };
 
-TEST_F(SafeLinkGuard, RefusesToGoThroughALinkThatStandsForAFolder)
+TEST_F(SwitchedLinks, RefusesToGoThroughALinkThatStandsForAFolder)
 {
     linkFolder();
     for (const auto *branch : {"adds", "edits", "edits-the-first", "drops", "drops-all"})
@@ -81,7 +81,7 @@ TEST_F(SafeLinkGuard, RefusesToGoThroughALinkThatStandsForAFolder)
     EXPECT_FALSE(repository_.tryGit({"checkout", "adds"}).succeeded());
 }
 
-TEST_F(SafeLinkGuard, RefusesALinkThatLeadsToAnotherFolderOfTheWorkingCopy)
+TEST_F(SwitchedLinks, RefusesALinkThatLeadsToAnotherFolderOfTheWorkingCopy)
 {
     repository_.write("copy/b", "precious\n");
     repository_.remove("dir");
@@ -89,7 +89,7 @@ TEST_F(SafeLinkGuard, RefusesALinkThatLeadsToAnotherFolderOfTheWorkingCopy)
     expectRefused("drops", inTheWay("dir"));
 }
 
-TEST_F(SafeLinkGuard, RefusesALinkThatIsDeeperDown)
+TEST_F(SwitchedLinks, RefusesALinkThatIsDeeperDown)
 {
     makeBranch("deep", [this] { repository_.write("dir/deep/new", "x"); });
     repository_.remove("dir/deep");
@@ -99,7 +99,7 @@ TEST_F(SafeLinkGuard, RefusesALinkThatIsDeeperDown)
 }
 
 /// libgit2 is past the link with the first of these, and sees no conflict in the second.
-TEST_F(SafeLinkGuard, RefusesALinkThatLibGit2IsPast)
+TEST_F(SwitchedLinks, RefusesALinkThatLibGit2IsPast)
 {
     repository_.write("dir-b", "x");
     repository_.write("new-b", "x");
@@ -114,7 +114,7 @@ TEST_F(SafeLinkGuard, RefusesALinkThatLibGit2IsPast)
     expectNothingOutsideChanged();
 }
 
-TEST_F(SafeLinkGuard, RefusesALinkThatIsStaged)
+TEST_F(SwitchedLinks, RefusesALinkThatIsStaged)
 {
     linkFolder();
     repository_.add({"dir"});
@@ -122,7 +122,7 @@ TEST_F(SafeLinkGuard, RefusesALinkThatIsStaged)
     expectNothingOutsideChanged();
 }
 
-TEST_F(SafeLinkGuard, RefusesALinkThatIsIgnored)
+TEST_F(SwitchedLinks, RefusesALinkThatIsIgnored)
 {
     repository_.write(".git/info/exclude", "dir\nnew\n");
     linkFolder();
@@ -133,7 +133,7 @@ TEST_F(SafeLinkGuard, RefusesALinkThatIsIgnored)
     expectNothingOutsideChanged();
 }
 
-TEST_F(SafeLinkGuard, LetsAnIgnoredLinkGiveWayToALinkOfTheBranch)
+TEST_F(SwitchedLinks, LetsAnIgnoredLinkGiveWayToALinkOfTheBranch)
 {
     makeBranch("links", [this] { repository_.symlink("same", "new"); });
     repository_.write(".git/info/exclude", "new\n");
@@ -144,7 +144,7 @@ TEST_F(SafeLinkGuard, LetsAnIgnoredLinkGiveWayToALinkOfTheBranch)
     expectNothingOutsideChanged();
 }
 
-TEST_F(SafeLinkGuard, RefusesAFastForwardToo)
+TEST_F(SwitchedLinks, RefusesAFastForwardToo)
 {
     linkFolder();
     const NothingChanges nothing(repository_);
@@ -160,7 +160,7 @@ TEST_F(SafeLinkGuard, RefusesAFastForwardToo)
     expectNothingOutsideChanged();
 }
 
-TEST_F(SafeLinkGuard, IsNoObstacleAboveFilesThatStayAsTheyAre)
+TEST_F(SwitchedLinks, IsNoObstacleAboveFilesThatStayAsTheyAre)
 {
     linkFolder();
     repository_.symlink("outside", "../link");
@@ -172,7 +172,7 @@ TEST_F(SafeLinkGuard, IsNoObstacleAboveFilesThatStayAsTheyAre)
     expectNothingOutsideChanged();
 }
 
-TEST_F(SafeLinkGuard, IsNoObstacleWhereTheLinkItselfIsTracked)
+TEST_F(SwitchedLinks, IsNoObstacleWhereTheLinkItselfIsTracked)
 {
     makeBranch("link", [this] { linkFolder(); });
     makeBranch("file",
@@ -192,13 +192,13 @@ TEST_F(SafeLinkGuard, IsNoObstacleWhereTheLinkItselfIsTracked)
     expectNothingOutsideChanged();
 }
 
-TEST_F(SafeLinkGuard, LeavesConflictsThatLibGit2FindsToIt)
+TEST_F(SwitchedLinks, LeavesConflictsThatLibGit2FindsToIt)
 {
     repository_.symlink("../outside/dir/a", "new");
     expectRefused("elsewhere", {GIT_ECONFLICT, GIT_ERROR_CHECKOUT, "1 conflict prevents checkout"});
 }
 
-TEST_F(SafeLinkGuard, HandsTheNotificationsOn)
+TEST_F(SwitchedLinks, HandsTheNotificationsOn)
 {
     linkFolder();
     interactor_->cancel();

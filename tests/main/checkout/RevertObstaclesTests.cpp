@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-#include "main/ForceLinkGuard.hpp"
+#include "main/checkout/CheckoutWatch.hpp"
 
 #include <filesystem>
 #include <string>
@@ -8,11 +8,11 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "StagingTest.hpp"
+#include "../StagingTest.hpp"
+#include "ObstacleTest.hpp"
 #include "error/errorUtil/GitResult.hpp"
 #include "support/text.hpp"
 #include "util/repository.hpp"
-#include "vclink/git/BranchManager.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
 
 namespace
@@ -22,7 +22,12 @@ namespace fs = std::filesystem;
 namespace git = vclink::git;
 using testing::Contains;
 using vclink::test::asPath;
+using vclink::test::Failure;
+using vclink::test::failureOf;
 using vclink::test::GitRepository;
+using vclink::test::makeFifo;
+using vclink::test::makeSocket;
+using vclink::test::workingTreeOf;
 
 /// What a record's own notification was told.
 struct Heard
@@ -40,10 +45,10 @@ int hear(git_checkout_notify_t /*why*/, const char *path, const git_diff_file * 
 }
 
 /// A folder and a file of the repository have become links to what lies outside.
-class ForceLinkGuard : public vclink::test::StagingTest
+class RevertObstacles : public vclink::test::StagingTest
 {
   protected:
-    ForceLinkGuard()
+    RevertObstacles()
     {
         repository_.write("folder/a", "committed");
         repository_.write("zlast", "committed");
@@ -68,7 +73,7 @@ class ForceLinkGuard : public vclink::test::StagingTest
         record.notify_flags = GIT_CHECKOUT_NOTIFY_ALL;
         record.notify_cb = hear;
         record.notify_payload = &heard_;
-        git::ForceLinkGuard links(repository.get(), record);
+        git::CheckoutWatch watch(git::CheckoutKind::Revert, repository.get(), record);
         return git_checkout_index(repository.get(), nullptr, &record);
     }
     void expectNothingOutsideChanged() const
@@ -80,7 +85,7 @@ class ForceLinkGuard : public vclink::test::StagingTest
     Heard heard_;
 };
 
-TEST_F(ForceLinkGuard, MakesFilesAndFoldersAgainOfLinks)
+TEST_F(RevertObstacles, MakesFilesAndFoldersAgainOfLinks)
 {
     EXPECT_EQ(checkOut(), 0);
     EXPECT_EQ(repository_.git({"status", "--porcelain"}), "");
@@ -89,7 +94,7 @@ TEST_F(ForceLinkGuard, MakesFilesAndFoldersAgainOfLinks)
     expectNothingOutsideChanged();
 }
 
-TEST_F(ForceLinkGuard, HandsTheNotificationsOn)
+TEST_F(RevertObstacles, HandsTheNotificationsOn)
 {
     EXPECT_EQ(checkOut(), 0);
     EXPECT_THAT(heard_.names, Contains("folder/a"));
@@ -97,7 +102,7 @@ TEST_F(ForceLinkGuard, HandsTheNotificationsOn)
     EXPECT_THAT(heard_.names, Contains("zlast"));
 }
 
-TEST_F(ForceLinkGuard, PutsTheLinksBackWhenTheCheckoutIsGivenUp)
+TEST_F(RevertObstacles, PutsTheLinksBackWhenTheCheckoutIsGivenUp)
 {
     const std::string before = repository_.git({"status", "--porcelain"});
     heard_.failsAt = "zlast";
@@ -109,14 +114,14 @@ TEST_F(ForceLinkGuard, PutsTheLinksBackWhenTheCheckoutIsGivenUp)
     expectNothingOutsideChanged();
 }
 
-TEST_F(ForceLinkGuard, LeavesTheLinkOfAFileThatTheCallbackRefuses)
+TEST_F(RevertObstacles, LeavesTheLinkOfAFileThatTheCallbackRefuses)
 {
     heard_.failsAt = "folder/a";
     EXPECT_EQ(checkOut(), GIT_EAUTH);
     EXPECT_EQ(fs::read_symlink(repository_ / "folder"), "../outside");
 }
 
-TEST_F(ForceLinkGuard, LeavesTrackedAndUntrackedLinksThatAreNotInTheWay)
+TEST_F(RevertObstacles, LeavesTrackedAndUntrackedLinksThatAreNotInTheWay)
 {
     ASSERT_EQ(checkOut(), 0);
     repository_.symlink("zlast", "tracked");
@@ -131,29 +136,78 @@ TEST_F(ForceLinkGuard, LeavesTrackedAndUntrackedLinksThatAreNotInTheWay)
     EXPECT_EQ(repository_.read("zlast"), "committed");
 }
 
-TEST_F(ForceLinkGuard, HoldsInAMerge)
+TEST_F(RevertObstacles, FifosAndSocketsAreReplacedAsGitDoes)
 {
-    repository_.git({"config", "user.name", "Somebody"});
-    repository_.git({"config", "user.email", "somebody@example.com"});
-    repository_.git({"checkout", "--quiet", "--force", "-b", "side"});
-    ASSERT_EQ(checkOut(), 0);
-    repository_.write("file", "theirs");
-    repository_.commitAll("theirs");
-    repository_.git({"checkout", "--quiet", "main"});
-    repository_.write("sub/inside", "ours");
-    repository_.commitAll("ours");
-    repository_.remove("folder");
-    repository_.symlink("../outside", "folder");
-    const auto adapter = makeAdapter(repository_.path());
-    git::BranchManager::create(*adapter)->merge("side");
-    EXPECT_EQ(repository_.read("file"), "theirs");
-    EXPECT_EQ(repository_.read("folder/a"), "committed");
-    EXPECT_TRUE(fs::is_directory(fs::symlink_status(repository_ / "folder")));
-    expectNothingOutsideChanged();
+    repository_.git({"reset", "--quiet", "--hard"});
+    repository_.remove("file");
+    makeFifo(repository_ / "file");
+    repository_.remove("other");
+    makeSocket(repository_ / "other");
+    repository_.remove("sub");
+    makeFifo(repository_ / "sub");
+    makeFifo(repository_ / "folder/pipe");
+    expectRevertsAsGit({"file", "other", "sub/inside", "folder"});
+    EXPECT_EQ(repository_.git({"status", "--porcelain"}), "");
+    EXPECT_TRUE(fs::is_fifo(repository_ / "folder/pipe"));
+}
+
+TEST_F(RevertObstacles, PutsFifosBackWhenTheCheckoutIsGivenUp)
+{
+    repository_.remove("file");
+    makeFifo(repository_ / "file");
+    heard_.failsAt = "zlast";
+    EXPECT_EQ(checkOut(), GIT_EAUTH);
+    EXPECT_TRUE(fs::is_fifo(repository_ / "file"));
+    EXPECT_EQ(fs::status(repository_ / "file").permissions(), fs::perms(0644));
+}
+
+TEST_F(RevertObstacles, FoldersInThePlaceOfAFileAreReplacedAsGitDoes)
+{
+    repository_.git({"reset", "--quiet", "--hard"});
+    repository_.remove("file");
+    repository_.write("file/mine", "mine\n");
+    repository_.remove("other");
+    GitRepository::init(repository_ / "other").commit("first");
+    repository_.remove("zlast");
+    repository_.makeFolder("zlast/empty");
+    expectRevertsAsGit({"file", "other", "zlast"});
+}
+
+TEST_F(RevertObstacles, FilesInThePlaceOfAFolderAreReplacedAsGitDoes)
+{
+    repository_.git({"reset", "--quiet", "--hard"});
+    repository_.remove("sub");
+    repository_.write("sub", "mine\n");
+    expectRevertsAsGit({"sub"});
+}
+
+/// libgit2's walk is past what is in the way, and would fail in the midst of its writing.
+TEST_F(RevertObstacles, ThatLibGit2IsPastAreRefused)
+{
+    repository_.git({"reset", "--quiet", "--hard"});
+    repository_.write("file-b", "x");
+    repository_.write("sub-b", "x");
+    repository_.commitAll("neighbours");
+    repository_.remove("sub");
+    repository_.write("sub", "mine\n");
+    repository_.write("sub-b", "edited\n");
+    repository_.write("file-b", "edited\n");
+    const auto before = workingTreeOf(repository_);
+    const std::string text = "the untracked file 'sub' is in the way of the checkout";
+    EXPECT_EQ(failureOf(
+                  [this] {
+                      revert({"sub/inside", "sub-b", "file-b"});
+                  }),
+              (Failure{GIT_ECONFLICT, GIT_ERROR_CHECKOUT, text}));
+    EXPECT_EQ(workingTreeOf(repository_), before);
+    repository_.remove("sub");
+    repository_.remove("file");
+    repository_.makeFolder("file");
+    expectRevertsAsGit({"sub/inside", "sub-b", "file", "file-b"});
 }
 
 /// The states are not known then, and are not needed.
-TEST_F(ForceLinkGuard, HoldsInARevertWhoseStateWalkFails)
+TEST_F(RevertObstacles, HoldsInARevertWhoseStateWalkFails)
 {
     GitRepository::init(repository_ / "line\nfeed").commit("first");
     repository_.write(".gitmodules", "[submodule \"s\"]\n\tpath = \"line\\nfeed\"\n");

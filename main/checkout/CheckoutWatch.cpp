@@ -1,0 +1,282 @@
+// SPDX-License-Identifier: MIT
+#include "main/checkout/CheckoutWatch.hpp"
+
+#include <array>
+#include <cstddef>
+
+#include <fcntl.h>
+#include <git2.h>
+
+#include "error/errorUtil/GitResult.hpp"
+#include "error/errorUtil/callbackException.hpp"
+#include "error/errorUtil/setGitError.hpp"
+#include "main/checkout/obstaclesAhead.hpp"
+#include "util/repository.hpp"
+
+namespace vclink::git
+{
+namespace
+{
+
+using ChangeRule = Finding (*)(WorkingCopy &, const TreeChange &);
+using NoticeRule = Finding (*)(WorkingCopy &, const CheckoutNotice &);
+
+constexpr std::array<ChangeRule, 6> switchRules{findBlockedWay,    findSpecialFile,
+                                                findIgnoredLink,   findForeignInFolder,
+                                                findMissingFolder, findSubmodule};
+constexpr std::array<ChangeRule, 2> mergeRules{findBlockedWayOfMerge, findUntracked};
+constexpr std::array<NoticeRule, 2> switchNoticeRules{findUnseen, findMissingFile};
+constexpr std::array<NoticeRule, 7> mergeNoticeRules{
+    findEdit,          findUnseen,           findUntrackedNoticed, findForeignInFolderNoticed,
+    findFolderNoticed, findSubmoduleNoticed, findHiddenEditNoticed};
+
+template <class Rules, class Subject>
+Finding ask(const Rules &rules, WorkingCopy &copy, const Subject &subject)
+{
+    for (const auto rule : rules)
+    {
+        Finding finding = rule(copy, subject);
+        if (finding)
+        {
+            return finding;
+        }
+    }
+    return {};
+}
+
+/// Owner of what git_merge_bases gives.
+class MergeBases
+{
+  public:
+    /// None of unrelated histories.
+    MergeBases(git_repository *repository, const git_oid *ours, const git_oid *theirs)
+    {
+        const GitResult<void> found =
+            makeResult(git_merge_bases(&array_, repository, ours, theirs));
+        if (!found.has_error() || found.error().getCode() != GIT_ENOTFOUND)
+        {
+            found.value();
+        }
+    }
+    MergeBases(const MergeBases &) = delete;
+    MergeBases &operator=(const MergeBases &) = delete;
+    ~MergeBases()
+    {
+        git_oidarray_dispose(&array_);
+    }
+
+    std::size_t size() const
+    {
+        return array_.count;
+    }
+    const git_oid *at(std::size_t index) const
+    {
+        return &array_.ids[index];
+    }
+
+  private:
+    git_oidarray array_{};
+};
+
+OwnedHandle<git_tree> treeOf(git_repository *repository, const git_oid *commitId)
+{
+    const OwnedHandle<git_commit> commit =
+        acquire<git_commit>(git_commit_lookup, repository, commitId).value();
+    return acquire<git_tree>(git_commit_tree, commit.get()).value();
+}
+
+Finding firstOf(Finding left, Finding right)
+{
+    return !left || (right && right->path < left->path) ? right : left;
+}
+
+int setConflict(const Obstacle &obstacle)
+{
+    git_error_set_str(GIT_ERROR_CHECKOUT, obstacle.text.c_str());
+    return GIT_ECONFLICT;
+}
+
+} // namespace
+
+CheckoutWatch::CheckoutWatch(CheckoutKind kind, git_repository *repository,
+                             git_checkout_options &record)
+    : kind_(kind), repository_(repository),
+      isForced_((record.checkout_strategy & GIT_CHECKOUT_FORCE) != 0), first_(record.notify_cb),
+      firstPayload_(record.notify_payload)
+{
+    const char *const workdir = git_repository_workdir(repository);
+    root_ = workdir != nullptr ? workdir : "";
+    record.notify_cb = pass;
+    record.notify_payload = this;
+    // A link or a FIFO that comes later must not be written through, or wait for a reader, either.
+    record.file_open_flags = O_CREAT | O_TRUNC | O_WRONLY | O_NOFOLLOW | O_NONBLOCK;
+}
+
+void CheckoutWatch::lookBeforeSwitch(const git_object *target)
+{
+    WorkingCopy &copy = copy_.emplace(repository_);
+    const OwnedHandle<git_object> peeled =
+        acquire<git_object>(git_object_peel, target, GIT_OBJECT_TREE).value();
+    const OwnedHandle<git_tree> tree = lookupTree(repository_, git_object_id(peeled.get()));
+    Finding found;
+    visitTreeChanges(repository_, copy.head(), tree.get(),
+                     [&](const TreeChange &change)
+                     {
+                         found = ask(switchRules, copy, change);
+                         if (!found && !isForced_)
+                         {
+                             found = findStagedContent(copy, change);
+                         }
+                         return !found;
+                     });
+    if (found)
+    {
+        refuse(*found);
+    }
+}
+
+void CheckoutWatch::lookBeforeMerge(const git_oid *theirs)
+{
+    WorkingCopy &copy = copy_.emplace(repository_);
+    git_oid ours{};
+    makeResult(git_reference_name_to_id(&ours, repository_, "HEAD")).value();
+    const OwnedHandle<git_tree> after = treeOf(repository_, theirs);
+    const MergeBases bases(repository_, &ours, theirs);
+    Finding first = findHiddenEdit(copy);
+    // Histories that are unrelated have the empty tree in common.
+    for (std::size_t i = 0; i == 0 || i < bases.size(); ++i)
+    {
+        const OwnedHandle<git_tree> before =
+            bases.size() != 0 ? treeOf(repository_, bases.at(i)) : nullptr;
+        Finding found;
+        visitTreeChanges(repository_, before.get(), after.get(),
+                         [&](const TreeChange &change)
+                         {
+                             found = ask(mergeRules, copy, change);
+                             return !found;
+                         });
+        first = firstOf(first, found);
+    }
+    if (first)
+    {
+        refuse(*first);
+    }
+}
+
+void CheckoutWatch::refuse(const Obstacle &obstacle)
+{
+    makeResult(first_(GIT_CHECKOUT_NOTIFY_CONFLICT, obstacle.path.c_str(), nullptr, nullptr,
+                      nullptr, firstPayload_))
+        .value();
+    makeResult(setConflict(obstacle)).value();
+}
+
+int CheckoutWatch::pass(git_checkout_notify_t why, const char *path, const git_diff_file *baseline,
+                        const git_diff_file *target, const git_diff_file *workdir,
+                        void *payload) noexcept
+{
+    auto &watch = *static_cast<CheckoutWatch *>(payload);
+    const int code = watch.first_(why, path, baseline, target, workdir, watch.firstPayload_);
+    if (code != 0)
+    {
+        return code;
+    }
+    try
+    {
+        return watch.hear({why, path, baseline, target, workdir});
+    }
+    catch (...)
+    {
+        return parkCallbackException();
+    }
+}
+
+int CheckoutWatch::hear(const CheckoutNotice &notice)
+{
+    if (notice.path == nullptr)
+    {
+        return 0;
+    }
+    const Finding found = kind_ == CheckoutKind::Revert ? clearAll(notice) : judge(notice);
+    return found ? setConflict(*found) : 0;
+}
+
+Finding CheckoutWatch::judge(const CheckoutNotice &notice)
+{
+    if (!copy_)
+    {
+        return {};
+    }
+    if (!hasHeard_)
+    {
+        // A merge's commands may have run for minutes since the look before.
+        copy_->forgetWays();
+        hasHeard_ = true;
+    }
+    Finding found = kind_ == CheckoutKind::Merge ? ask(mergeNoticeRules, *copy_, notice)
+                                                 : ask(switchNoticeRules, *copy_, notice);
+    if (!found)
+    {
+        makeWay(notice);
+    }
+    return found;
+}
+
+/// Removes what no rule keeps and libgit2 would go through or fail at, where a new file comes: an
+/// ignored link, and an empty folder that libgit2 is past.
+void CheckoutWatch::makeWay(const CheckoutNotice &notice)
+{
+    if (notice.why != GIT_CHECKOUT_NOTIFY_UPDATED || notice.baseline != nullptr ||
+        notice.target == nullptr || notice.target->mode == GIT_FILEMODE_COMMIT)
+    {
+        return;
+    }
+    const std::string name = notice.path;
+    const WorkingCopy::Way &way = copy_->wayTo(name);
+    if (way.standing == Standing::Link)
+    {
+        cleared_.remove(root_ + way.blocker);
+        copy_->forgetWays();
+    }
+    const Standing standing = copy_->at(name);
+    if (standing == Standing::Link || (standing == Standing::Folder && notice.workdir == nullptr))
+    {
+        cleared_.remove(root_ + name);
+    }
+}
+
+/// What libgit2 sees in the way of a revert it replaces itself; what it is past would stop it in
+/// the midst of its writing.
+Finding CheckoutWatch::clearAll(const CheckoutNotice &notice)
+{
+    if (notice.target == nullptr)
+    {
+        return {};
+    }
+    const bool isPast = notice.why == GIT_CHECKOUT_NOTIFY_UPDATED && notice.workdir == nullptr;
+    const std::string name = notice.path;
+    for (auto end = name.find('/'); end != std::string::npos; end = name.find('/', end + 1))
+    {
+        const std::string above = name.substr(0, end);
+        const Standing standing = standingAt(root_ + above);
+        if (standing == Standing::Link || standing == Standing::Special)
+        {
+            cleared_.remove(root_ + above);
+        }
+        else if (standing == Standing::File && isPast)
+        {
+            return inTheWay(above, standing);
+        }
+    }
+    const Standing standing = standingAt(root_ + name);
+    const bool isFolder =
+        standing == Standing::Folder && isPast && notice.target->mode != GIT_FILEMODE_COMMIT;
+    if (isFolder || standing == Standing::Link || standing == Standing::Special)
+    {
+        cleared_.remove(root_ + name);
+    }
+    return isFolder && standingAt(root_ + name) == Standing::Folder ? inTheWay(name, standing)
+                                                                    : Finding();
+}
+
+} // namespace vclink::git

@@ -1,0 +1,63 @@
+// SPDX-License-Identifier: MIT
+#include "main/checkout/ClearedWay.hpp"
+
+#include <cerrno>
+
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include "error/errorUtil/raiseSystemError.hpp"
+#include "main/checkout/standing.hpp"
+
+namespace vclink::git
+{
+
+ClearedWay::~ClearedWay()
+{
+    for (auto removed = removed_.rbegin(); removed != removed_.rend(); ++removed)
+    {
+        putBack(*removed);
+    }
+}
+
+void ClearedWay::remove(const std::string &path)
+{
+    struct stat status = {};
+    if (::lstat(path.c_str(), &status) != 0 || S_ISREG(status.st_mode))
+    {
+        return;
+    }
+    removed_.push_back({path, status.st_mode, S_ISLNK(status.st_mode) ? readLink(path) : ""});
+    const bool isFolder = S_ISDIR(status.st_mode);
+    if ((isFolder ? ::rmdir(path.c_str()) : ::unlink(path.c_str())) == 0)
+    {
+        return;
+    }
+    const int error = errno;
+    removed_.pop_back();
+    if (!isFolder)
+    {
+        raiseSystemError(error, "could not remove '" + path + "'");
+    }
+}
+
+/// Fails if something has come into the place, which stays: after a checkout, everywhere.
+void ClearedWay::putBack(const Removed &removed)
+{
+    const char *const path = removed.path.c_str();
+    const mode_t permissions = removed.mode & ALLPERMS;
+    if (S_ISLNK(removed.mode))
+    {
+        static_cast<void>(::symlink(removed.target.c_str(), path) == 0);
+    }
+    else if (S_ISFIFO(removed.mode))
+    {
+        static_cast<void>(::mkfifo(path, permissions) == 0);
+    }
+    else if (S_ISDIR(removed.mode))
+    {
+        static_cast<void>(::mkdir(path, permissions) == 0);
+    }
+}
+
+} // namespace vclink::git

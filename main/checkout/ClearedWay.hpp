@@ -1,0 +1,41 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <string>
+#include <vector>
+
+#include <sys/types.h>
+
+namespace vclink::git
+{
+
+/// Removes what a checkout would go through or block at, before it writes. At its end it puts back
+/// what nothing has come into the place of: that is all of it after a checkout that failed or was
+/// cancelled.
+class ClearedWay
+{
+  public:
+    ClearedWay() = default;
+    ClearedWay(const ClearedWay &) = delete;
+    ClearedWay &operator=(const ClearedWay &) = delete;
+    ~ClearedWay();
+
+    /// Removes a link, a FIFO, a socket, a device or an empty folder; leaves anything else. Sockets
+    /// and devices cannot be put back.
+    /// @param path absolute
+    /// @throws LibGit2Exception if it cannot be removed
+    void remove(const std::string &path);
+
+  private:
+    struct Removed
+    {
+        std::string path;
+        mode_t mode;
+        std::string target;
+    };
+    static void putBack(const Removed &removed);
+
+    std::vector<Removed> removed_;
+};
+
+} // namespace vclink::git

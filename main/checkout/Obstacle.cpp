@@ -1,0 +1,41 @@
+// SPDX-License-Identifier: MIT
+#include "main/checkout/Obstacle.hpp"
+
+namespace vclink::git
+{
+namespace
+{
+
+const char *describe(Standing standing)
+{
+    switch (standing)
+    {
+    case Standing::File:
+        return "the untracked file ";
+    case Standing::Link:
+        return "the symbolic link ";
+    case Standing::Folder:
+        return "the folder ";
+    case Standing::Special:
+        return "the FIFO, socket or device ";
+    case Standing::Nothing:
+        break;
+    }
+    return "";
+}
+
+} // namespace
+
+Obstacle inTheWay(const std::string &name, Standing standing)
+{
+    return {name, describe(standing) + ("'" + name) + "' is in the way of the checkout"};
+}
+
+Obstacle inChangedFolder(const std::string &name, Standing standing)
+{
+    // It may be staged, and so no untracked file.
+    const char *const what = standing == Standing::File ? "the file " : describe(standing);
+    return {name, what + ("'" + name) + "' is in a folder that becomes a file"};
+}
+
+} // namespace vclink::git

@@ -1,0 +1,206 @@
+// SPDX-License-Identifier: MIT
+#include "main/checkout/WorkingCopy.hpp"
+
+#include <filesystem>
+#include <memory>
+#include <utility>
+
+#include <git2.h>
+#include <sys/stat.h>
+
+#include "error/errorUtil/GitResult.hpp"
+#include "main/checkout/ids.hpp"
+#include "util/repository.hpp"
+
+namespace vclink::git
+{
+namespace
+{
+
+struct FreeTreeEntry
+{
+    void operator()(git_tree_entry *entry) const
+    {
+        git_tree_entry_free(entry);
+    }
+};
+
+OwnedHandle<git_tree> lookupHeadTree(git_repository *repository)
+{
+    auto head = acquire<git_reference>(git_repository_head, repository);
+    if (head.has_error() && head.error().getCode() == GIT_EUNBORNBRANCH)
+    {
+        return nullptr;
+    }
+    const OwnedHandle<git_reference> reference = std::move(head).value();
+    const OwnedHandle<git_object> object =
+        acquire<git_object>(git_reference_peel, reference.get(), GIT_OBJECT_TREE).value();
+    return lookupTree(repository, git_object_id(object.get()));
+}
+
+std::string workdirOf(git_repository *repository)
+{
+    const char *const workdir = git_repository_workdir(repository);
+    return workdir != nullptr ? workdir : "";
+}
+
+} // namespace
+
+WorkingCopy::WorkingCopy(git_repository *repository)
+    : repository_(repository), root_(workdirOf(repository)), index_(getRepositoryIndex(repository)),
+      head_(lookupHeadTree(repository))
+{
+}
+
+Standing WorkingCopy::at(const std::string &name)
+{
+    return wayTo(name).standing == Standing::Folder ? standingAt(root_ + name) : Standing::Nothing;
+}
+
+bool WorkingCopy::holdsFiles(const std::string &folder) const
+{
+    return vclink::git::holdsFiles(root_ + folder);
+}
+
+const WorkingCopy::Way &WorkingCopy::wayTo(const std::string &name)
+{
+    const auto end = name.rfind('/');
+    if (end == std::string::npos)
+    {
+        return wayToRoot_;
+    }
+    const auto known = ways_.find(name.substr(0, end));
+    if (known != ways_.end())
+    {
+        return known->second;
+    }
+    const Way *way = &wayToRoot_;
+    for (auto next = name.find('/'); next != std::string::npos; next = name.find('/', next + 1))
+    {
+        const auto [place, isNew] = ways_.try_emplace(name.substr(0, next));
+        if (isNew)
+        {
+            place->second = wayInto(place->first, *way);
+        }
+        way = &place->second;
+    }
+    return *way;
+}
+
+void WorkingCopy::forgetWays()
+{
+    ways_.clear();
+}
+
+WorkingCopy::Way WorkingCopy::wayInto(const std::string &folder, const Way &above) const
+{
+    if (above.standing != Standing::Folder || !above.blocker.empty())
+    {
+        return above;
+    }
+    const Standing standing = standingAt(root_ + folder);
+    if (standing == Standing::Nothing)
+    {
+        return {standing, ""};
+    }
+    const git_object_t type = typeInHead(folder);
+    const bool isReplaced = type == GIT_OBJECT_BLOB || type == GIT_OBJECT_COMMIT;
+    if (standing == Standing::Folder)
+    {
+        return {standing, isReplaced && holdsFiles(folder) ? folder : ""};
+    }
+    // A file or link that HEAD has goes first, if it is unchanged.
+    const bool goesFirst = isReplaced && standing != Standing::Special;
+    return goesFirst ? Way{Standing::Nothing, ""} : Way{standing, folder};
+}
+
+const git_index_entry *WorkingCopy::entryOf(const std::string &name) const
+{
+    return git_index_get_bypath(index_.get(), name.c_str(), 0);
+}
+
+bool WorkingCopy::isFolderInHead(const std::string &name) const
+{
+    return typeInHead(name) == GIT_OBJECT_TREE;
+}
+
+std::string WorkingCopy::foreignBelow(const std::string &folder) const
+{
+    namespace fs = std::filesystem;
+    std::error_code error;
+    fs::recursive_directory_iterator entry(root_ + folder, error);
+    for (; !error && entry != fs::recursive_directory_iterator(); entry.increment(error))
+    {
+        const std::string name = entry->path().string().substr(root_.size());
+        const bool isFolder = entry->symlink_status(error).type() == fs::file_type::directory;
+        const git_object_t type = typeInHead(name);
+        if (isFolder ? type != GIT_OBJECT_TREE : type != GIT_OBJECT_BLOB)
+        {
+            return name;
+        }
+    }
+    return error ? folder : "";
+}
+
+bool WorkingCopy::isIgnored(const std::string &name) const
+{
+    int ignored = 0;
+    makeResult(git_ignore_path_is_ignored(&ignored, repository_, name.c_str())).value();
+    return ignored != 0;
+}
+
+bool WorkingCopy::isEdited(const git_index_entry &entry)
+{
+    const std::string name = entry.path;
+    if (!wayTo(name).blocker.empty())
+    {
+        return true;
+    }
+    const Standing standing = at(name);
+    if (standing == Standing::File || standing == Standing::Link)
+    {
+        const git_oid id = idOf(name, standing);
+        return S_ISLNK(entry.mode) != (standing == Standing::Link) || !isSameId(id, entry.id);
+    }
+    return standing == Standing::Special || (standing == Standing::Folder && holdsFiles(name));
+}
+
+/// The id of what is there as git would store it.
+git_oid WorkingCopy::idOf(const std::string &name, Standing standing) const
+{
+    git_oid id{};
+    const std::string path = root_ + name;
+    if (standing == Standing::Link)
+    {
+        const std::string target = readLink(path);
+        makeResult(git_odb_hash(&id, target.data(), target.size(), GIT_OBJECT_BLOB)).value();
+    }
+    else
+    {
+        makeResult(
+            git_repository_hashfile(&id, repository_, path.c_str(), GIT_OBJECT_BLOB, name.c_str()))
+            .value();
+    }
+    return id;
+}
+
+/// GIT_OBJECT_INVALID if HEAD does not have the name.
+git_object_t WorkingCopy::typeInHead(const std::string &name) const
+{
+    if (head_ == nullptr)
+    {
+        return GIT_OBJECT_INVALID;
+    }
+    git_tree_entry *raw = nullptr;
+    const GitResult<void> found =
+        makeResult(git_tree_entry_bypath(&raw, head_.get(), name.c_str()));
+    const std::unique_ptr<git_tree_entry, FreeTreeEntry> entry(raw);
+    if (found.has_error() && found.error().getCode() == GIT_ENOTFOUND)
+    {
+        return GIT_OBJECT_INVALID;
+    }
+    found.value();
+    return git_tree_entry_type(entry.get());
+}
+
+} // namespace vclink::git

@@ -1,0 +1,162 @@
+// SPDX-License-Identifier: MIT
+#include "main/checkout/obstaclesAhead.hpp"
+
+#include <cstddef>
+
+#include <git2/tree.h>
+#include <sys/stat.h>
+
+#include "main/checkout/ids.hpp"
+
+namespace vclink::git
+{
+namespace
+{
+
+bool isGitlink(const git_tree_entry *entry)
+{
+    return entry != nullptr && git_tree_entry_filemode(entry) == GIT_FILEMODE_COMMIT;
+}
+
+/// Whether the checkout makes a file or link here.
+bool makesFile(const TreeChange &change)
+{
+    return change.after != nullptr && !isGitlink(change.after);
+}
+
+bool isOf(const git_index_entry &entry, const git_tree_entry *side)
+{
+    return side != nullptr && isSameId(entry.id, *git_tree_entry_id(side)) &&
+           entry.mode == static_cast<unsigned>(git_tree_entry_filemode(side));
+}
+
+} // namespace
+
+Finding findBlockedWay(WorkingCopy &copy, const TreeChange &change)
+{
+    const WorkingCopy::Way &way = copy.wayTo(change.path);
+    return way.blocker.empty() ? Finding() : inTheWay(way.blocker, way.standing);
+}
+
+Finding findSpecialFile(WorkingCopy &copy, const TreeChange &change)
+{
+    const bool isSpecial = copy.at(change.path) == Standing::Special;
+    return isSpecial ? inTheWay(change.path, Standing::Special) : Finding();
+}
+
+Finding findIgnoredLink(WorkingCopy &copy, const TreeChange &change)
+{
+    const bool makesNewFile = change.before == nullptr && makesFile(change) &&
+                              git_tree_entry_filemode(change.after) != GIT_FILEMODE_LINK;
+    const bool isInTheWay =
+        makesNewFile && copy.at(change.path) == Standing::Link && copy.isIgnored(change.path);
+    return isInTheWay ? inTheWay(change.path, Standing::Link) : Finding();
+}
+
+Finding findForeignInFolder(WorkingCopy &copy, const TreeChange &change)
+{
+    if (change.before != nullptr || !makesFile(change) ||
+        copy.at(change.path) != Standing::Folder || !copy.isFolderInHead(change.path))
+    {
+        return {};
+    }
+    const std::string name = copy.foreignBelow(change.path);
+    return name.empty() ? Finding() : inChangedFolder(name, copy.at(name));
+}
+
+Finding findMissingFolder(WorkingCopy &copy, const TreeChange &change)
+{
+    const bool isMissing = change.before == nullptr && makesFile(change) &&
+                           copy.at(change.path) == Standing::Nothing &&
+                           copy.isFolderInHead(change.path);
+    return isMissing ? Obstacle{change.path, "the folder '" + change.path +
+                                                 "', which becomes a file, is missing: bring it "
+                                                 "back with 'git restore --source=HEAD --staged "
+                                                 "--worktree' first"}
+                     : Finding();
+}
+
+Finding findSubmodule(WorkingCopy &copy, const TreeChange &change)
+{
+    const bool isReplaced = isGitlink(change.before) && makesFile(change);
+    const bool isInTheWay = isReplaced && copy.holdsFiles(change.path);
+    return isInTheWay ? inTheWay(change.path, Standing::Folder) : Finding();
+}
+
+Finding findStagedContent(WorkingCopy &copy, const TreeChange &change)
+{
+    const git_index_entry *const entry = copy.entryOf(change.path);
+    if (entry == nullptr || entry->mode == GIT_FILEMODE_COMMIT || isOf(*entry, change.before) ||
+        isOf(*entry, change.after))
+    {
+        return {};
+    }
+    // The same content in the file is a conflict, which libgit2 finds.
+    if (copy.at(change.path) != Standing::Nothing && !copy.isEdited(*entry))
+    {
+        return {};
+    }
+    return Obstacle{change.path,
+                    "the staged changes of '" + change.path + "' would be lost in the checkout"};
+}
+
+Finding findBlockedWayOfMerge(WorkingCopy &copy, const TreeChange &change)
+{
+    const WorkingCopy::Way &way = copy.wayTo(change.path);
+    const bool mayGo = way.standing == Standing::Link || way.standing == Standing::File;
+    if (way.blocker.empty() || (mayGo && copy.isIgnored(way.blocker)))
+    {
+        return {};
+    }
+    return inTheWay(way.blocker, way.standing);
+}
+
+Finding findUntracked(WorkingCopy &copy, const TreeChange &change)
+{
+    if (!makesFile(change) || copy.entryOf(change.path) != nullptr)
+    {
+        return {};
+    }
+    const Standing standing = copy.at(change.path);
+    const bool isKeptFolder = standing == Standing::Folder &&
+                              (copy.isFolderInHead(change.path) || !copy.holdsFiles(change.path));
+    if (standing == Standing::Nothing || isKeptFolder ||
+        (standing != Standing::Special && copy.isIgnored(change.path)))
+    {
+        return {};
+    }
+    return inTheWay(change.path, standing);
+}
+
+Finding findHiddenEdit(WorkingCopy &copy)
+{
+    const std::size_t count = git_index_entrycount(copy.index());
+    for (std::size_t i = 0; i < count; ++i)
+    {
+        const git_index_entry *const entry = git_index_get_byindex(copy.index(), i);
+        if (isHidden(*entry) && copy.isEdited(*entry))
+        {
+            return hiddenEdit(*entry);
+        }
+    }
+    return {};
+}
+
+Obstacle hiddenEdit(const git_index_entry &entry)
+{
+    const bool isSparse = (entry.flags_extended & GIT_INDEX_ENTRY_SKIP_WORKTREE) != 0;
+    const std::string option = isSparse ? "skip-worktree" : "assume-unchanged";
+    const std::string name = entry.path;
+    return {name, "the changes of '" + name + "' would be lost in the merge. Git hides them, " +
+                      "because the file is marked " + option + ": take the mark away with " +
+                      "'git update-index --no-" + option + "' and commit, or remove the file"};
+}
+
+bool isHidden(const git_index_entry &entry) noexcept
+{
+    return ((entry.flags & GIT_INDEX_ENTRY_VALID) != 0 ||
+            (entry.flags_extended & GIT_INDEX_ENTRY_SKIP_WORKTREE) != 0) &&
+           entry.mode != GIT_FILEMODE_COMMIT;
+}
+
+} // namespace vclink::git

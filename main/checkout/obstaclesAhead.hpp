@@ -1,0 +1,47 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include "main/checkout/Obstacle.hpp"
+#include "main/checkout/WorkingCopy.hpp"
+#include "main/checkout/treeChanges.hpp"
+
+/// The rules that look before a checkout begins: at what libgit2 does not tell of, or tells too
+/// late to be refused.
+namespace vclink::git
+{
+
+// Before a switch or a fast-forward: `before` is of HEAD's tree, `after` of the target's.
+
+/// Something above the path that is no folder, or a folder in the place of a file.
+Finding findBlockedWay(WorkingCopy &copy, const TreeChange &change);
+/// A FIFO, a socket or a device at the path.
+Finding findSpecialFile(WorkingCopy &copy, const TreeChange &change);
+/// An ignored link where a file comes: libgit2 would write to what it leads to.
+Finding findIgnoredLink(WorkingCopy &copy, const TreeChange &change);
+/// Something that HEAD does not have in a folder that becomes a file: libgit2 would delete the
+/// folder's tracked files and then fail.
+Finding findForeignInFolder(WorkingCopy &copy, const TreeChange &change);
+/// A missing folder that becomes a file: libgit2 would write neither the file nor its entry.
+Finding findMissingFolder(WorkingCopy &copy, const TreeChange &change);
+/// A submodule with files that becomes a file.
+Finding findSubmodule(WorkingCopy &copy, const TreeChange &change);
+/// Staged content that is neither side's and not the file's either: libgit2 compares the file only,
+/// and drops the entry.
+Finding findStagedContent(WorkingCopy &copy, const TreeChange &change);
+
+// Before a merge: `before` is of a merge base's tree, `after` of the other side's.
+
+/// As findBlockedWay; ignored links and files do not count.
+Finding findBlockedWayOfMerge(WorkingCopy &copy, const TreeChange &change);
+/// Something untracked where the other side has a file, unless it is ignored.
+Finding findUntracked(WorkingCopy &copy, const TreeChange &change);
+/// The first file with a change that Git hides, since the file is marked skip-worktree or
+/// assume-unchanged. A merge would undo it, whether the other side touches the file or not.
+Finding findHiddenEdit(WorkingCopy &copy);
+
+/// What findHiddenEdit says of an entry with a change.
+Obstacle hiddenEdit(const git_index_entry &entry);
+/// Whether Git hides changes of the entry's file.
+bool isHidden(const git_index_entry &entry) noexcept;
+
+} // namespace vclink::git

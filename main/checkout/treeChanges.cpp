@@ -1,0 +1,140 @@
+// SPDX-License-Identifier: MIT
+#include "main/checkout/treeChanges.hpp"
+
+#include <cstddef>
+#include <utility>
+#include <vector>
+
+#include <git2/tree.h>
+
+#include "error/errorUtil/GitResult.hpp"
+#include "main/checkout/ids.hpp"
+#include "util/repository.hpp"
+
+namespace vclink::git
+{
+namespace
+{
+
+/// One tree, and how far its entries were read.
+struct Side
+{
+    OwnedHandle<git_tree> owned;
+    const git_tree *tree = nullptr;
+    std::size_t next = 0;
+
+    const git_tree_entry *current() const
+    {
+        return tree != nullptr ? git_tree_entry_byindex(tree, next) : nullptr;
+    }
+};
+
+/// A folder of both trees. The levels are kept here and not on the stack, since a repository from
+/// elsewhere decides how deep they go.
+struct Level
+{
+    Side before;
+    Side after;
+    std::size_t pathSize = 0;
+};
+
+bool isSame(const git_tree_entry *left, const git_tree_entry *right)
+{
+    return left != nullptr && right != nullptr &&
+           isSameId(*git_tree_entry_id(left), *git_tree_entry_id(right)) &&
+           git_tree_entry_filemode(left) == git_tree_entry_filemode(right);
+}
+
+bool isFolder(const git_tree_entry *entry)
+{
+    return git_tree_entry_type(entry) == GIT_OBJECT_TREE;
+}
+
+/// The byte at this place of a name. A folder's name ends with a slash in the order of a tree.
+unsigned char byteOf(const git_tree_entry *entry, const char *name, std::size_t place)
+{
+    const auto byte = static_cast<unsigned char>(name[place]);
+    return byte == 0 && isFolder(entry) ? '/' : byte;
+}
+
+/// As git_tree_entry_cmp, without a call for each of many files.
+int compare(const git_tree_entry *left, const git_tree_entry *right)
+{
+    const char *const leftName = git_tree_entry_name(left);
+    const char *const rightName = git_tree_entry_name(right);
+    std::size_t place = 0;
+    while (leftName[place] != 0 && leftName[place] == rightName[place])
+    {
+        ++place;
+    }
+    return byteOf(left, leftName, place) - byteOf(right, rightName, place);
+}
+
+Side openSide(git_repository *repository, const git_tree_entry *folder)
+{
+    Side side;
+    if (folder != nullptr)
+    {
+        side.owned = lookupTree(repository, git_tree_entry_id(folder));
+        side.tree = side.owned.get();
+    }
+    return side;
+}
+
+/// The next entry of each side, null on the side that lacks the name. A folder's name and a file's
+/// are never the same one.
+std::pair<const git_tree_entry *, const git_tree_entry *> takeNext(Level &level)
+{
+    const git_tree_entry *before = level.before.current();
+    const git_tree_entry *after = level.after.current();
+    const bool hasBoth = before != nullptr && after != nullptr;
+    const int order = hasBoth ? compare(before, after) : 0;
+    if (order < 0)
+    {
+        after = nullptr;
+    }
+    else if (order > 0)
+    {
+        before = nullptr;
+    }
+    level.before.next += before != nullptr ? 1U : 0U;
+    level.after.next += after != nullptr ? 1U : 0U;
+    return {before, after};
+}
+
+} // namespace
+
+void visitTreeChanges(git_repository *repository, const git_tree *before, const git_tree *after,
+                      const std::function<bool(const TreeChange &)> &visit)
+{
+    std::string path;
+    std::vector<Level> levels(1);
+    levels.back().before.tree = before;
+    levels.back().after.tree = after;
+    while (!levels.empty())
+    {
+        const auto [left, right] = takeNext(levels.back());
+        const git_tree_entry *const either = left != nullptr ? left : right;
+        if (either == nullptr)
+        {
+            levels.pop_back();
+        }
+        else if (!isSame(left, right))
+        {
+            path.resize(levels.back().pathSize);
+            path += git_tree_entry_name(either);
+            if (isFolder(either))
+            {
+                path += '/';
+                levels.push_back(
+                    {openSide(repository, left), openSide(repository, right), path.size()});
+            }
+            else if (!visit({path, left, right}))
+            {
+                return;
+            }
+        }
+    }
+}
+
+} // namespace vclink::git
