@@ -148,7 +148,7 @@ std::vector<Tolerance> tolerancesOfOthers(const std::string &operation, const st
         {"getRemoteBranches", "git_branch_next", 2, GIT_ITEROVER, normal},
         {"merge", "git_index_conflict_next", any, GIT_ITEROVER, normal},
         // A name that HEAD does not have, and histories without a common commit.
-        {"merge", "git_tree_entry_bypath", any, GIT_ENOTFOUND, normal},
+        {"", "git_tree_entry_bypath", any, GIT_ENOTFOUND, normal},
         {"merge", "git_merge_bases", any, GIT_ENOTFOUND, normal},
         // A state without a name.
         {"getRepositoryState", "git_repository_state", any, any, "done: "},

@@ -68,7 +68,8 @@ class BranchCallsTest : public MergeTest
                                 "git_object_free",      "git_reference_free"};
     const Calls lookBeforeASwitch_ =
         joined({openingTheLook_,
-                {"git_object_peel", "git_tree_lookup", "git_tree_free", "git_object_free"}});
+                {"git_object_peel", "git_tree_lookup", "git_tree_entry_bypath", "git_tree_free",
+                 "git_object_free"}});
     const Calls lookingUpATree_{"git_commit_lookup", "git_commit_tree", "git_commit_free"};
     const Calls lookBeforeAMerge_ = joined({openingTheLook_,
                                             {"git_reference_name_to_id"},
