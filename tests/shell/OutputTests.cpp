@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: MIT
 #include <csignal>
+#include <filesystem>
 
 #include "ShellTest.hpp"
 
@@ -25,11 +26,12 @@ class ShellOutput : public ShellTest
 
 TEST_F(ShellOutput, ThatFillsTheDiskIsAnError)
 {
+    const std::filesystem::path empty = makeRepository("empty").path();
     for (const std::string arguments : {"status", "status -z", "version", "--help", "probe ."})
     {
         const CommandResult result =
             Command({"sh", "-c", "exec \"$0\" " + arguments + " >/dev/full", VCLINK_SHELL})
-                .in(makeRepository("copy").path())
+                .in(empty)
                 .run();
         // What has nothing to write has nothing to complain of.
         EXPECT_EQ(result.exitStatus, arguments.rfind("status", 0) == 0 ? 0 : 1) << arguments;
