@@ -50,6 +50,8 @@ class MergeBases
   public:
     /// None of unrelated histories.
     MergeBases(git_repository *repository, const git_oid *ours, const git_oid *theirs)
+        // So that what a failing call has left is released.
+        : MergeBases()
     {
         const GitResult<void> found =
             makeResult(git_merge_bases(&array_, repository, ours, theirs));
@@ -75,6 +77,8 @@ class MergeBases
     }
 
   private:
+    MergeBases() = default;
+
     git_oidarray array_{};
 };
 

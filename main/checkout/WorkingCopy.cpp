@@ -131,7 +131,7 @@ std::string WorkingCopy::foreignBelow(const std::string &folder) const
     fs::recursive_directory_iterator entry(root_ + folder, error);
     for (; !error && entry != fs::recursive_directory_iterator(); entry.increment(error))
     {
-        const std::string name = entry->path().string().substr(root_.size());
+        std::string name = entry->path().string().substr(root_.size());
         const bool isFolder = entry->symlink_status(error).type() == fs::file_type::directory;
         const git_object_t type = typeInHead(name);
         if (isFolder ? type != GIT_OBJECT_TREE : type != GIT_OBJECT_BLOB)
