@@ -3,17 +3,15 @@
 
 #include <system_error>
 
-#include "error/errorUtil/setGitError.hpp"
-#include "vclink/git/LibGit2Exception.hpp"
+#include "error/errorUtil/raiseGitError.hpp"
 
 namespace vclink::git
 {
 
-void raiseSystemError(int error, const std::string &text)
+void raiseSystemError(int error, const std::string &text, int errorClass)
 {
     const std::string reason = std::generic_category().message(error);
-    git_error_set_str(GIT_ERROR_OS, (text + ": " + reason).c_str());
-    throw LibGit2Exception(GitError(GIT_ERROR));
+    raiseGitError(GIT_ERROR, errorClass, text + ": " + reason);
 }
 
 } // namespace vclink::git

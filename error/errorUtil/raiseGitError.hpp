@@ -1,0 +1,14 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <string>
+
+namespace vclink::git
+{
+
+/// Throws what libgit2 would give for a failure that the library itself finds.
+/// @param code of git_error_code, @param errorClass of git_error_t
+/// @throws LibGit2Exception
+[[noreturn]] void raiseGitError(int code, int errorClass, const std::string &text);
+
+} // namespace vclink::git
