@@ -2,6 +2,7 @@
 #include "main/BasicBranchManager.hpp"
 
 #include <array>
+#include <utility>
 
 #include <git2/branch.h>
 #include <git2/checkout.h>
@@ -16,6 +17,8 @@
 #include "main/BranchMerger.hpp"
 #include "main/checkout/CheckoutWatch.hpp"
 #include "options/gitRecords.hpp"
+#include "util/IndexLock.hpp"
+#include "util/referenceLocks.hpp"
 #include "util/repository.hpp"
 
 namespace vclink::git
@@ -98,15 +101,21 @@ void BasicBranchManager::switchBranch(const BranchName &name)
     writeRecord(SeverityParameter, " branch=", name);
     const char *const shortName = asGitString(name);
     const OwnedHandle<git_repository> repository = adapter_.getRepository();
+    IndexLock lock(repository.get());
     const OwnedHandle<git_reference> branch = lookupLocalBranch(repository.get(), shortName);
     const OwnedHandle<git_object> target = revparseObject(repository.get(), name).value();
     const CheckoutOptions options = optionsFactory_->makeCheckoutOptions();
     git_checkout_options record = toGitCheckoutOptions(options, callbacks_->checkoutCallbacks());
     CheckoutWatch watch(CheckoutKind::Switch, repository.get(), record);
     watch.lookBeforeSwitch(target.get());
+    awaitUnlocked(repository.get(), "HEAD");
     makeResult(git_checkout_tree(repository.get(), target.get(), &record)).value();
+    lock.publish();
     // Only now, so that a checkout that fails leaves HEAD where it was.
-    makeResult(git_repository_set_head(repository.get(), git_reference_name(branch.get()))).value();
+    const char *const head = git_reference_name(branch.get());
+    retryWhileLocked(repository.get(),
+                     [&] { return makeResult(git_repository_set_head(repository.get(), head)); })
+        .value();
 }
 
 void BasicBranchManager::createBranch(const BranchParameters &parameters)
@@ -118,16 +127,32 @@ void BasicBranchManager::createBranch(const BranchParameters &parameters)
     const OwnedHandle<git_repository> repository = adapter_.getRepository();
     const OwnedHandle<git_commit> commit =
         lookupCommitByName(asGitString(startPoint), repository.get()).value();
-    acquire<git_reference>(git_branch_create, repository.get(), asGitString(name), commit.get(), 0)
+    retryWhileLocked(repository.get(),
+                     [&]
+                     {
+                         return acquire<git_reference>(git_branch_create, repository.get(),
+                                                       asGitString(name), commit.get(), 0);
+                     })
         .value();
 }
 
 void BasicBranchManager::deleteBranch(const BranchName &name)
 {
     const char *const shortName = asGitString(name);
-    const OwnedHandle<git_repository> repository = adapter_.getRepository();
-    const OwnedHandle<git_reference> branch = lookupLocalBranch(repository.get(), shortName);
-    makeResult(git_branch_delete(branch.get())).value();
+    OwnedHandle<git_repository> repository = adapter_.getRepository();
+    bool isFirstTry = true;
+    const auto deleteOnce = [&]
+    {
+        if (!std::exchange(isFirstTry, false))
+        {
+            // A handle that has met locked packed references takes the branch for gone from then
+            // on, and reports success.
+            repository = adapter_.getRepository();
+        }
+        const OwnedHandle<git_reference> branch = lookupLocalBranch(repository.get(), shortName);
+        return makeResult(git_branch_delete(branch.get()));
+    };
+    retryWhileLocked(repository.get(), deleteOnce).value();
 }
 
 BranchPointer BasicBranchManager::getCurrentBranch() const

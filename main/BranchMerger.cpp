@@ -7,6 +7,8 @@
 
 #include <git2/annotated_commit.h>
 #include <git2/checkout.h>
+#include <git2/errors.h>
+#include <git2/graph.h>
 #include <git2/merge.h>
 #include <git2/object.h>
 #include <git2/refs.h>
@@ -14,11 +16,14 @@
 
 #include "error/errorUtil/GitResult.hpp"
 #include "error/errorUtil/gitString.hpp"
+#include "error/errorUtil/raiseGitError.hpp"
 #include "error/errorUtil/rethrowAsGitException.hpp"
 #include "error/logging/logger.hpp"
 #include "error/raise.hpp"
 #include "main/checkout/CheckoutWatch.hpp"
 #include "options/gitRecords.hpp"
+#include "util/IndexLock.hpp"
+#include "util/referenceLocks.hpp"
 #include "util/repository.hpp"
 #include "vclink/git/messageIdentifiers.hpp"
 
@@ -39,6 +44,22 @@ std::string nameBits(unsigned bits, std::initializer_list<std::pair<unsigned, co
         }
     }
     return text;
+}
+
+/// The branch may have moved since the analysis, and must not lose what it has.
+void refuseMovedBranch(git_repository *repository, const git_reference *head, const git_oid *target)
+{
+    const git_oid *const current = git_reference_target(head);
+    const int isAhead = git_graph_descendant_of(repository, target, current);
+    if (isAhead == 0)
+    {
+        raiseGitError(GIT_EMODIFIED, GIT_ERROR_MERGE,
+                      "the current branch has moved since the merge began");
+    }
+    if (isAhead < 0)
+    {
+        makeResult(isAhead).value();
+    }
 }
 
 } // namespace
@@ -65,10 +86,7 @@ void BranchMerger::performMerge(const BranchName &name)
 
 void BranchMerger::decide(const BranchName &name, git_repository *repository)
 {
-    if (readRepositoryState(repository) != GIT_REPOSITORY_STATE_NONE)
-    {
-        raise(shared_vclink::git::UnableToMergeBadRepositoryState());
-    }
+    refuseOtherStates(repository);
     const git_oid *const id = revparseId(name, repository);
     const OwnedHandle<git_annotated_commit> theirs =
         acquire<git_annotated_commit>(git_annotated_commit_lookup, repository, id).value();
@@ -102,11 +120,22 @@ void BranchMerger::decide(const BranchName &name, git_repository *repository)
     threeWayMerge(name, repository, theirs.get());
 }
 
+void BranchMerger::refuseOtherStates(git_repository *repository)
+{
+    if (readRepositoryState(repository) != GIT_REPOSITORY_STATE_NONE)
+    {
+        raise(shared_vclink::git::UnableToMergeBadRepositoryState());
+    }
+}
+
 void BranchMerger::fastForward(git_repository *repository, git_annotated_commit *theirs)
 {
+    IndexLock lock(repository);
+    refuseOtherStates(repository);
     const OwnedHandle<git_reference> head =
         acquire<git_reference>(git_repository_head, repository).value();
     const git_oid *const id = git_annotated_commit_id(theirs);
+    refuseMovedBranch(repository, head.get(), id);
     const OwnedHandle<git_object> target =
         acquire<git_object>(git_object_lookup, repository, id, GIT_OBJECT_COMMIT).value();
     CheckoutOptions options = optionsFactory_->makeCheckoutOptions();
@@ -114,9 +143,14 @@ void BranchMerger::fastForward(git_repository *repository, git_annotated_commit 
     git_checkout_options record = toGitCheckoutOptions(options, callbacks_->checkoutCallbacks());
     CheckoutWatch watch(CheckoutKind::Switch, repository, record);
     watch.lookBeforeSwitch(target.get());
+    awaitUnlocked(repository, git_reference_name(head.get()));
     makeResult(git_checkout_tree(repository, target.get(), &record)).value();
+    lock.publish();
     // Only now, so that a checkout that fails leaves the branch where it was.
-    acquire<git_reference>(git_reference_set_target, head.get(), id, nullptr).value();
+    retryWhileLocked(
+        repository,
+        [&] { return acquire<git_reference>(git_reference_set_target, head.get(), id, nullptr); })
+        .value();
 }
 
 std::string mergeAnalysisToText(unsigned analysis)

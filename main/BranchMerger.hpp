@@ -16,6 +16,8 @@ struct git_index_entry;
 namespace vclink::git
 {
 
+class IndexLock;
+
 /// Carries out one merge. Made for it, and gone with it.
 class BranchMerger
 {
@@ -43,9 +45,11 @@ class BranchMerger
 
   private:
     void decide(const BranchName &name, git_repository *repository);
+    /// To be asked again once the index is locked: until then another process may begin something.
+    static void refuseOtherStates(git_repository *repository);
     void commitMerge(const BranchName &name, git_repository *repository);
     [[noreturn]] void endWithConflicts(git_repository *repository, git_index *index,
-                                       const git_checkout_options &options);
+                                       const git_checkout_options &options, IndexLock &lock);
 
     GitAdapter &adapter_;
     std::shared_ptr<GitOptionsFactory> optionsFactory_;

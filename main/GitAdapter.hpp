@@ -20,6 +20,8 @@
 namespace vclink::git
 {
 
+class IndexLock;
+
 /// The back end of one working copy. Holds what it needs to open the repository and to build option
 /// records, and nothing of the repository itself. See GitAdapterFactory::createAdapterFor.
 class GitAdapter : public vclink::CMAdapter
@@ -52,7 +54,7 @@ class GitAdapter : public vclink::CMAdapter
     void addToIndex(const std::vector<upath> &files);
     void removeFromIndex(const std::vector<upath> &files);
     void createCommit(git_repository *repository, const ustring &message,
-                      const std::vector<const git_commit *> &parents);
+                      const std::vector<const git_commit *> &parents, IndexLock &lock);
     /// @return the states that it looked at
     FileStateMap throwIfConflicted(const std::vector<upath> &files);
 

@@ -15,6 +15,8 @@
 #include "main/GitAdapter.hpp"
 #include "main/commitIdentity.hpp"
 #include "main/indexRefresh.hpp"
+#include "util/IndexLock.hpp"
+#include "util/referenceLocks.hpp"
 #include "util/repository.hpp"
 
 namespace vclink::git
@@ -50,16 +52,16 @@ std::vector<OwnedHandle<git_commit>> lookupMergeHeads(git_repository *repository
 
 /// libgit2 1.5 answers with success, and has moved no branch, when it can't write the commit's
 /// object, on a full disk for example. All that tells then is that there is no such object, and the
-/// error record, which stands until the next call.
-void throwIfNotWritten(git_repository *repository, const git_oid &id)
+/// error record, which stands until the next call. Raises then, and keeps any other failure.
+GitResult<OwnedHandle<git_object>> lookUpWritten(git_repository *repository, const git_oid &id)
 {
     const GitError failure(GIT_ERROR);
-    const auto commit = acquire<git_object>(git_object_lookup, repository, &id, GIT_OBJECT_COMMIT);
+    auto commit = acquire<git_object>(git_object_lookup, repository, &id, GIT_OBJECT_COMMIT);
     if (commit.has_error() && commit.error().getCode() == GIT_ENOTFOUND)
     {
         GitErrorPolicy::throwIfError(failure);
     }
-    commit.value();
+    return commit;
 }
 
 } // namespace
@@ -67,6 +69,8 @@ void throwIfNotWritten(git_repository *repository, const git_oid &id)
 void GitAdapter::commit(const upath & /*folder*/, const ustring &message)
 {
     const OwnedHandle<git_repository> repository = openRepository(root_);
+    // From here on nobody else commits, merges or ends a merge in this working copy.
+    IndexLock lock(repository.get());
     // Without a commit at HEAD, for whatever reason, the new commit is a root commit.
     const GitResult<OwnedHandle<git_commit>> head = lookupCommitByName("HEAD", repository.get());
     std::vector<OwnedHandle<git_commit>> mergeHeads;
@@ -83,11 +87,11 @@ void GitAdapter::commit(const upath & /*folder*/, const ustring &message)
             parents.push_back(mergeHead.get());
         }
     }
-    createCommit(repository.get(), message, parents);
+    createCommit(repository.get(), message, parents, lock);
 }
 
 void GitAdapter::createCommit(git_repository *repository, const ustring &message,
-                              const std::vector<const git_commit *> &parents)
+                              const std::vector<const git_commit *> &parents, IndexLock &lock)
 {
     // First, so that a missing identity fails with nothing touched.
     const OwnedHandle<git_signature> signature = makeSignature(repository);
@@ -98,15 +102,24 @@ void GitAdapter::createCommit(git_repository *repository, const ustring &message
     const std::string text = fl::i18n::ustring_to_utf8(message);
     const git_oid treeId = writeIndexTree(index.get());
     const OwnedHandle<git_tree> tree = lookupTree(repository, &treeId);
+    // Before HEAD moves: an older index would undo the commit in the next one.
+    lock.publish();
     git_oid id{};
     // libgit2's parameter is not const throughout.
     auto parentPointers = parents;
-    makeResult(git_commit_create(&id, repository, "HEAD", signature.get(), signature.get(), "UTF-8",
-                                 text.c_str(), tree.get(), parentPointers.size(),
-                                 parentPointers.data()))
+    retryWhileLocked(repository,
+                     [&]
+                     {
+                         return makeResult(
+                             git_commit_create(&id, repository, "HEAD", signature.get(),
+                                               signature.get(), "UTF-8", text.c_str(), tree.get(),
+                                               parentPointers.size(), parentPointers.data()));
+                     })
         .value();
-    throwIfNotWritten(repository, id);
+    const GitResult<OwnedHandle<git_object>> written = lookUpWritten(repository, id);
+    // The commit stands, even if its object can't be read just now.
     cleanUpRepositoryState(repository);
+    written.value();
 }
 
 } // namespace vclink::git

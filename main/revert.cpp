@@ -13,6 +13,7 @@
 #include "main/GitAdapter.hpp"
 #include "main/checkout/CheckoutWatch.hpp"
 #include "options/gitRecords.hpp"
+#include "util/IndexLock.hpp"
 #include "util/PathspecArray.hpp"
 #include "util/repository.hpp"
 #include "vclink/git/messageIdentifiers.hpp"
@@ -100,6 +101,7 @@ void GitAdapter::revertFiles(const std::vector<upath> &files)
     }
     const PathspecArray pathspec = makeFilePathspec(files, root_);
     const OwnedHandle<git_repository> repository = openRepository(root_);
+    IndexLock lock(repository.get());
     // Without a HEAD the reset takes the paths out of the index.
     const GitResult<OwnedHandle<git_object>> head = revparseObject(repository.get(), "HEAD");
     const std::vector<std::string> names = changedNames(states, root_);
@@ -112,6 +114,7 @@ void GitAdapter::revertFiles(const std::vector<upath> &files)
     record.paths = getArray(pathspec);
     const CheckoutWatch watch(CheckoutKind::Revert, repository.get(), record);
     makeResult(git_checkout_index(repository.get(), nullptr, &record)).value();
+    lock.publish();
 }
 
 } // namespace vclink::git

@@ -6,6 +6,7 @@
 #include "error/raise.hpp"
 #include "fl/filesystem/operations.hpp"
 #include "main/GitAdapter.hpp"
+#include "util/IndexLock.hpp"
 #include "util/PathspecArray.hpp"
 #include "util/repository.hpp"
 #include "vclink/git/messageIdentifiers.hpp"
@@ -84,12 +85,14 @@ void GitAdapter::addToIndex(const std::vector<upath> &files)
     }
     refuseNuls(files);
     const OwnedHandle<git_repository> repository = openRepository(root_);
+    IndexLock lock(repository.get());
     const OwnedHandle<git_index> index = getRepositoryIndex(repository.get());
     const PathspecArray pathspec = makeFilePathspec(files, root_);
     makeResult(git_index_add_all(index.get(), getArrayPointer(pathspec), GIT_INDEX_ADD_DEFAULT,
                                  acceptAllPaths, this))
         .value();
     writeIndex(index.get());
+    lock.publish();
 }
 
 void GitAdapter::removeFromIndex(const std::vector<upath> &files)
@@ -100,11 +103,13 @@ void GitAdapter::removeFromIndex(const std::vector<upath> &files)
     }
     refuseNuls(files);
     const OwnedHandle<git_repository> repository = openRepository(root_);
+    IndexLock lock(repository.get());
     const OwnedHandle<git_index> index = getRepositoryIndex(repository.get());
     const PathspecArray pathspec = makeFilePathspec(files, root_);
     makeResult(git_index_remove_all(index.get(), getArrayPointer(pathspec), acceptAllPaths, this))
         .value();
     writeIndex(index.get());
+    lock.publish();
 }
 
 } // namespace vclink::git

@@ -15,6 +15,7 @@
 #include "main/BranchMerger.hpp"
 #include "main/checkout/CheckoutWatch.hpp"
 #include "options/gitRecords.hpp"
+#include "util/IndexLock.hpp"
 #include "util/PathspecArray.hpp"
 #include "util/pathspecEscape.hpp"
 #include "util/repository.hpp"
@@ -101,14 +102,18 @@ void BranchMerger::threeWayMerge(const BranchName &name, git_repository *reposit
         toGitCheckoutOptions(options, callbacks_->checkoutCallbacks());
     const git_merge_options mergeRecord = toGitMergeOptions(mergeOptions);
     const git_annotated_commit *heads[] = {theirs};
+    IndexLock lock(repository);
+    refuseOtherStates(repository);
     CheckoutWatch watch(CheckoutKind::Merge, repository, checkoutRecord);
     watch.lookBeforeMerge(git_annotated_commit_id(theirs));
     makeResult(git_merge(repository, heads, 1, &mergeRecord, &checkoutRecord)).value();
     const OwnedHandle<git_index> index = getRepositoryIndex(repository);
     if (git_index_has_conflicts(index.get()) != 0)
     {
-        endWithConflicts(repository, index.get(), checkoutRecord);
+        endWithConflicts(repository, index.get(), checkoutRecord, lock);
     }
+    // The commit takes it again, for a repository of its own.
+    lock.release();
     commitMerge(name, repository);
 }
 
@@ -122,7 +127,7 @@ void BranchMerger::commitMerge(const BranchName &name, git_repository *repositor
 }
 
 void BranchMerger::endWithConflicts(git_repository *repository, git_index *index,
-                                    const git_checkout_options &options)
+                                    const git_checkout_options &options, IndexLock &lock)
 {
     const std::vector<ustring> paths = listUnmergeable(repository, index);
     if (!paths.empty())
@@ -133,6 +138,7 @@ void BranchMerger::endWithConflicts(git_repository *repository, git_index *index
         copy.checkout_strategy |= GIT_CHECKOUT_USE_OURS;
         makeResult(git_checkout_index(repository, nullptr, &copy)).value();
     }
+    lock.publish();
     raise(shared_vclink::git::HasConflicts());
 }
 

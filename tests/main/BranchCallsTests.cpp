@@ -71,10 +71,12 @@ TEST_F(CallsOnBranches, OfASwitchAreTheseInOrder)
     LibGit2Recorder calls;
     branches().switchBranch("topic");
     EXPECT_EQ(calls.steps(),
-              joined({{"git_repository_open_ext", "git_branch_lookup", "git_revparse_single",
-                       "git_checkout_options_init"},
+              joined({{"git_repository_open_ext", "git_index_open", "git_repository_set_index",
+                       "git_index_set_caps", "git_index_free", "git_branch_lookup",
+                       "git_revparse_single", "git_checkout_options_init"},
                       lookBeforeASwitch_,
-                      {"git_checkout_tree", "git_repository_set_head"},
+                      {"git_transaction_new", "git_transaction_lock_ref", "git_transaction_free",
+                       "git_checkout_tree", "git_repository_set_head"},
                       endOfTheLook_,
                       {"git_object_free", "git_reference_free", "git_repository_free"}}));
 }
@@ -94,9 +96,11 @@ TEST_F(CallsOnBranches, OfASwitchAreRaisedWhenTheyFail)
 {
     makeAhead();
     const NothingChanges nothing(repository_);
-    expectEachRaised({"git_repository_open_ext", "git_branch_lookup", "git_revparse_single",
+    expectEachRaised({"git_repository_open_ext", "git_index_open", "git_repository_set_index",
+                      "git_index_set_caps", "git_branch_lookup", "git_revparse_single",
                       "git_repository_index", "git_repository_head", "git_reference_peel",
-                      "git_tree_lookup", "git_object_peel", "git_checkout_tree"},
+                      "git_tree_lookup", "git_object_peel", "git_transaction_new",
+                      "git_transaction_lock_ref", "git_checkout_tree"},
                      [this] { branches().switchBranch("topic"); });
 }
 

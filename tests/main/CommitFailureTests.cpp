@@ -154,8 +154,8 @@ TEST_F(CommitFailure, OfALockedIndexChangesNothingAndLeavesTheLock)
         const NothingChanges nothing(repository_);
         EXPECT_EQ(failure(),
                   (Failure{GIT_ELOCKED, GIT_ERROR_INDEX,
-                           "the index is locked; this might be due to a concurrent or crashed "
-                           "process"}));
+                           "the index is locked by '" + (repository_ / ".git/index.lock").string() +
+                               "'; this might be due to a concurrent or crashed process"}));
         EXPECT_EQ(states(repository_, {"file", "other"}),
                   (States{{"file", "Modified"}, {"other", "Missing"}}));
     }

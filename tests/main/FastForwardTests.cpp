@@ -136,7 +136,8 @@ TEST_F(FastForward, OverwritesAnIgnoredFileAsGitDoes)
 TEST_F(FastForward, LeavesTheBranchWhenItCannotBeMoved)
 {
     const std::string before = idOf("main");
-    repository_.write(".git/refs/heads/main.lock", "");
+    interactor_->progress.onCall = [this](std::size_t)
+    { repository_.write(".git/refs/heads/main.lock", ""); };
     EXPECT_THAT(failureOfMerge("topic"), HasSubstr("(code -14"));
     EXPECT_EQ(idOf("main"), before);
     EXPECT_EQ(repository_.read("file"), "of topic\n");

@@ -95,10 +95,13 @@ TEST_F(CallsOfAMerge, OfAFastForwardAreTheseInOrder)
     EXPECT_EQ(calls.steps(),
               joined({{"git_repository_open_ext", "git_repository_state", "git_revparse_single",
                        "git_oid_cpy", "git_object_free", "git_annotated_commit_lookup",
-                       "git_merge_analysis", "git_repository_head", "git_object_lookup",
+                       "git_merge_analysis", "git_index_open", "git_repository_set_index",
+                       "git_index_set_caps", "git_index_free", "git_repository_state",
+                       "git_repository_head", "git_graph_descendant_of", "git_object_lookup",
                        "git_checkout_options_init"},
                       lookBeforeASwitch_,
-                      {"git_checkout_tree", "git_reference_set_target", "git_reference_free"},
+                      {"git_transaction_new", "git_transaction_lock_ref", "git_transaction_free",
+                       "git_checkout_tree", "git_reference_set_target", "git_reference_free"},
                       endOfTheLook_,
                       {"git_object_free", "git_reference_free", "git_annotated_commit_free",
                        "git_repository_free"}}));
@@ -112,10 +115,12 @@ TEST_F(CallsOfAMerge, OfAFastForwardFailTheMergeWhenTheyFail)
     makeAhead();
     {
         const NothingChanges nothing(repository_);
-        expectEachFailsTheMerge({"git_repository_open_ext", "git_revparse_single",
-                                 "git_annotated_commit_lookup", "git_repository_head",
-                                 "git_object_lookup", "git_repository_index", "git_reference_peel",
-                                 "git_tree_lookup", "git_object_peel", "git_checkout_tree"});
+        expectEachFailsTheMerge(
+            {"git_repository_open_ext", "git_revparse_single", "git_annotated_commit_lookup",
+             "git_index_open", "git_repository_set_index", "git_index_set_caps",
+             "git_repository_head", "git_graph_descendant_of", "git_object_lookup",
+             "git_repository_index", "git_reference_peel", "git_tree_lookup", "git_object_peel",
+             "git_transaction_new", "git_transaction_lock_ref", "git_checkout_tree"});
     }
     const std::string main = idOf("main");
     expectEachFailsTheMerge({"git_reference_set_target"});
@@ -180,7 +185,9 @@ TEST_F(CallsOfAMerge, OfACleanMergeAreTheseInOrder)
     const Calls expected =
         joined({{"git_repository_open_ext", "git_repository_state", "git_revparse_single",
                  "git_oid_cpy", "git_object_free", "git_annotated_commit_lookup",
-                 "git_merge_analysis", "git_checkout_options_init", "git_merge_options_init"},
+                 "git_merge_analysis", "git_checkout_options_init", "git_merge_options_init",
+                 "git_index_open", "git_repository_set_index", "git_index_set_caps",
+                 "git_index_free", "git_repository_state"},
                 lookBeforeAMerge_,
                 {"git_merge", "git_repository_index", "git_index_has_conflicts",
                  "git_reference_dwim", "git_reference_free", "git_repository_open_ext"}});
@@ -202,10 +209,11 @@ TEST_F(CallsOfAMerge, OfACleanMergeFailItWhenTheyFail)
 {
     makeDiverged();
     const NothingChanges nothing(repository_);
-    expectEachFailsTheMerge({"git_repository_open_ext", "git_revparse_single",
-                             "git_annotated_commit_lookup", "git_repository_index",
-                             "git_repository_head", "git_reference_peel", "git_tree_lookup",
-                             "git_reference_name_to_id", "git_merge_bases", "git_merge"});
+    expectEachFailsTheMerge(
+        {"git_repository_open_ext", "git_revparse_single", "git_annotated_commit_lookup",
+         "git_index_open", "git_repository_set_index", "git_index_set_caps", "git_repository_index",
+         "git_repository_head", "git_reference_peel", "git_tree_lookup", "git_reference_name_to_id",
+         "git_merge_bases", "git_merge"});
 }
 
 TEST_F(CallsOfAMerge, OfTheIndexFailTheMergeThatStandsByThen)

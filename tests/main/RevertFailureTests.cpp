@@ -50,13 +50,13 @@ TEST_F(RevertFailure, OfALockedIndexChangesNothing)
 {
     repository_.write(".git/index.lock", "another process");
     const NothingChanges nothing(repository_);
-    EXPECT_EQ(
-        failureOf(
-            [this] {
-                revert({"file", "other"});
-            }),
-        (Failure{GIT_ELOCKED, GIT_ERROR_INDEX,
-                 "the index is locked; this might be due to a concurrent or crashed process"}));
+    EXPECT_EQ(failureOf(
+                  [this] {
+                      revert({"file", "other"});
+                  }),
+              (Failure{GIT_ELOCKED, GIT_ERROR_INDEX,
+                       "the index is locked by '" + path(".git/index.lock") +
+                           "'; this might be due to a concurrent or crashed process"}));
 }
 
 TEST_F(RevertFailure, OfAFolderOfGitThatCannotBeWrittenChangesNothing)

@@ -28,10 +28,14 @@ using vclink::test::ofTheQuery;
 using vclink::test::operator+;
 using Names = std::vector<std::string>;
 
-const Names ofTheAddition{"git_repository_open_ext", "git_repository_index", "git_index_add_all",
-                          "git_index_write",         "git_index_free",       "git_repository_free"};
-const Names ofTheRemoval{"git_repository_open_ext", "git_repository_index", "git_index_remove_all",
-                         "git_index_write",         "git_index_free",       "git_repository_free"};
+const Names ofTheOpening{"git_repository_open_ext"};
+const Names ofTheLock = ofTheOpening + Names{"git_index_open", "git_repository_set_index",
+                                             "git_index_set_caps", "git_index_free"};
+const Names ofTheEnd{"git_index_free", "git_repository_free"};
+const Names ofTheAddition =
+    ofTheLock + Names{"git_repository_index", "git_index_add_all", "git_index_write"} + ofTheEnd;
+const Names ofTheRemoval =
+    ofTheLock + Names{"git_repository_index", "git_index_remove_all", "git_index_write"} + ofTheEnd;
 
 /// What an index call was given.
 struct AskedOfIndex
@@ -222,40 +226,48 @@ class FailingStagingCalls : public StagingCalls
 
 TEST_F(FailingStagingCalls, EndAnAdditionAndReleaseTheHandles)
 {
-    const Names open{"git_repository_open_ext"};
-    const Names index = open + Names{"git_repository_index"};
+    const Names index = ofTheLock + Names{"git_repository_index"};
     const Names addAll = index + Names{"git_index_add_all"};
-    const Names released{"git_index_free", "git_repository_free"};
     const std::vector<FailingIndexCall> failing{
-        {"git_repository_open_ext", open},
+        {"git_repository_open_ext", ofTheOpening},
+        {"git_index_open", ofTheOpening + Names{"git_index_open", "git_repository_free"}},
+        {"git_repository_set_index",
+         ofTheOpening + Names{"git_index_open", "git_repository_set_index"} + ofTheEnd},
+        {"git_index_set_caps",
+         ofTheOpening + Names{"git_index_open", "git_repository_set_index", "git_index_set_caps"} +
+             ofTheEnd},
         {"git_repository_index", index + Names{"git_repository_free"}},
-        {"git_index_add_all", addAll + released},
-        {"git_index_write", addAll + Names{"git_index_write"} + released}};
+        {"git_index_add_all", addAll + ofTheEnd},
+        {"git_index_write", addAll + Names{"git_index_write"} + ofTheEnd}};
     for (const auto &call : failing)
         expectFails(call, [this] { markResolved("new"); });
-    for (const auto &call : {failing[1], failing[2], failing[3]})
+    for (auto call = failing.begin() + 1; call != failing.end(); ++call)
     {
-        const FailingIndexCall afterTheQuery{call.name, ofTheQuery + call.expected};
+        const FailingIndexCall afterTheQuery{call->name, ofTheQuery + call->expected};
         expectFails(afterTheQuery, [this] { add({"new"}); });
     }
 }
 
 TEST_F(FailingStagingCalls, EndARemovalAndReleaseTheHandles)
 {
-    const Names open{"git_repository_open_ext"};
-    const Names index = open + Names{"git_repository_index"};
+    const Names index = ofTheLock + Names{"git_repository_index"};
     const Names removeAll = index + Names{"git_index_remove_all"};
-    const Names released{"git_index_free", "git_repository_free"};
     const std::vector<FailingIndexCall> failing{
-        {"git_repository_open_ext", open},
+        {"git_repository_open_ext", ofTheOpening},
+        {"git_index_open", ofTheOpening + Names{"git_index_open", "git_repository_free"}},
+        {"git_repository_set_index",
+         ofTheOpening + Names{"git_index_open", "git_repository_set_index"} + ofTheEnd},
+        {"git_index_set_caps",
+         ofTheOpening + Names{"git_index_open", "git_repository_set_index", "git_index_set_caps"} +
+             ofTheEnd},
         {"git_repository_index", index + Names{"git_repository_free"}},
-        {"git_index_remove_all", removeAll + released},
-        {"git_index_write", removeAll + Names{"git_index_write"} + released}};
+        {"git_index_remove_all", removeAll + ofTheEnd},
+        {"git_index_write", removeAll + Names{"git_index_write"} + ofTheEnd}};
     for (const auto &call : failing)
         expectFails(call, [this] { markResolved("missing"); });
-    for (const auto &call : {failing[1], failing[2], failing[3]})
+    for (auto call = failing.begin() + 1; call != failing.end(); ++call)
     {
-        const FailingIndexCall afterTheQuery{call.name, ofTheQuery + call.expected};
+        const FailingIndexCall afterTheQuery{call->name, ofTheQuery + call->expected};
         expectFails(afterTheQuery, [this] { remove({"file"}); });
     }
 }

@@ -27,9 +27,6 @@ using vclink::test::NothingChanges;
 using vclink::test::printed;
 using vclink::test::States;
 
-constexpr const char *locked =
-    "the index is locked; this might be due to a concurrent or crashed process";
-
 /// What a failure of libgit2 leaves behind: nothing, here with a repository that holds changes of
 /// all kinds.
 class StagingFailure : public vclink::test::StagingTest
@@ -66,7 +63,10 @@ TEST_F(StagingFailure, OfALockedIndexChangesNothing)
     for (const auto &[name, operation] : operations())
     {
         SCOPED_TRACE(name);
-        EXPECT_EQ(failureOf(operation), (Failure{GIT_ELOCKED, GIT_ERROR_INDEX, locked}));
+        EXPECT_EQ(failureOf(operation),
+                  (Failure{GIT_ELOCKED, GIT_ERROR_INDEX,
+                           "the index is locked by '" + inGit("index.lock") +
+                               "'; this might be due to a concurrent or crashed process"}));
     }
     EXPECT_EQ(repository_.read(".git/index.lock"), "another process");
 }
@@ -217,8 +217,10 @@ TEST_F(StagingFailure, OfAnIndexThatCannotBeWrittenToItsEndChangesNothing)
         ::setrlimit(RLIMIT_FSIZE, &limit);
         action();
     };
-    EXPECT_EQ(unprivilegedFailureOf([&] { withLittleSpace([this] { remove({"file"}); }); }),
-              printed({GIT_ERROR, GIT_ERROR_OS, "failed to write out file: File too large"}));
+    EXPECT_EQ(
+        unprivilegedFailureOf([&] { withLittleSpace([this] { remove({"file"}); }); }),
+        printed({GIT_ERROR, GIT_ERROR_OS,
+                 "could not copy the index to '" + inGit("index.vclink") + "': File too large"}));
 }
 
 TEST_F(StagingFailure, OfARootThatCannotBeOpenedIsRaised)

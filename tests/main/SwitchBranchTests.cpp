@@ -218,7 +218,7 @@ TEST_F(SwitchBranch, IsRefusedWhileTheIndexIsLocked)
 /// The files and the index have moved then, which `git status` shows.
 TEST_F(SwitchBranch, LeavesTheHeadWhenItCannotBeMoved)
 {
-    repository_.write(".git/HEAD.lock", "");
+    interactor_->progress.onCall = [this](std::size_t) { repository_.write(".git/HEAD.lock", ""); };
     EXPECT_EQ(libGit2FailureOf([this] { switchTo("topic"); }).code, GIT_ELOCKED);
     EXPECT_EQ(currentBranch(), "refs/heads/main");
     EXPECT_EQ(repository_.read("a"), "of topic, and longer\n");
