@@ -13,8 +13,10 @@
 #include "error/errorUtil/callbackException.hpp"
 #include "fl/i18n/convert.hpp"
 #include "main/GitAdapter.hpp"
+#include "main/MergeMarker.hpp"
 #include "main/commitIdentity.hpp"
 #include "main/indexRefresh.hpp"
+#include "main/interruptedMerge.hpp"
 #include "util/IndexLock.hpp"
 #include "util/referenceLocks.hpp"
 #include "util/repository.hpp"
@@ -79,13 +81,22 @@ void GitAdapter::commit(const upath & /*folder*/, const ustring &message)
     {
         parents.push_back(head.value().get());
     }
-    if (readRepositoryState(repository.get()) == GIT_REPOSITORY_STATE_MERGE)
+    const int state = readRepositoryState(repository.get());
+    if (state == GIT_REPOSITORY_STATE_MERGE)
     {
         mergeHeads = lookupMergeHeads(repository.get());
         for (const auto &mergeHead : mergeHeads)
         {
             parents.push_back(mergeHead.get());
         }
+    }
+    if (head.has_value() && mergeHeads.size() == 1)
+    {
+        refuseInterruptedMerge(repository.get(), parents.front(), parents.back());
+    }
+    else if (state == GIT_REPOSITORY_STATE_NONE)
+    {
+        removeMergeMarker(repository.get());
     }
     createCommit(repository.get(), message, parents, lock);
 }

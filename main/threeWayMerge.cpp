@@ -1,4 +1,6 @@
 // SPDX-License-Identifier: MIT
+#include <optional>
+
 #include <git2/annotated_commit.h>
 #include <git2/attr.h>
 #include <git2/checkout.h>
@@ -13,6 +15,7 @@
 #include "error/raise.hpp"
 #include "fl/i18n/convert.hpp"
 #include "main/BranchMerger.hpp"
+#include "main/MergeMarker.hpp"
 #include "main/checkout/CheckoutWatch.hpp"
 #include "options/gitRecords.hpp"
 #include "util/IndexLock.hpp"
@@ -102,16 +105,21 @@ void BranchMerger::threeWayMerge(const BranchName &name, git_repository *reposit
         toGitCheckoutOptions(options, callbacks_->checkoutCallbacks());
     const git_merge_options mergeRecord = toGitMergeOptions(mergeOptions);
     const git_annotated_commit *heads[] = {theirs};
+    // Outlasts the lock, so that it stands until the index is in place.
+    std::optional<MergeMarker> marker;
     IndexLock lock(repository);
     refuseOtherStates(repository);
     CheckoutWatch watch(CheckoutKind::Merge, repository, checkoutRecord);
     watch.lookBeforeMerge(git_annotated_commit_id(theirs));
+    marker.emplace(repository, theirs);
     makeResult(git_merge(repository, heads, 1, &mergeRecord, &checkoutRecord)).value();
     const OwnedHandle<git_index> index = getRepositoryIndex(repository);
     if (git_index_has_conflicts(index.get()) != 0)
     {
         endWithConflicts(repository, index.get(), checkoutRecord, lock);
     }
+    lock.publish();
+    marker.reset();
     // The commit takes it again, for a repository of its own.
     lock.release();
     commitMerge(name, repository);

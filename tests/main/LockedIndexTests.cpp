@@ -79,6 +79,7 @@ TEST_F(LockedIndex, MakesEveryOperationFailBeforeItsFirstWrite)
     EXPECT_NE(failureOfMerge("topic").find("index.lock"), std::string::npos);
     EXPECT_NE(failureOfMerge("diverged").find("index.lock"), std::string::npos);
     EXPECT_EQ(repository_.git({"count-objects", "-v"}), objects);
+    EXPECT_FALSE(fs::exists(repository_ / ".git/vclink-merge"));
     EXPECT_EQ(repository_.read(".git/index.lock"), "of another process");
 }
 

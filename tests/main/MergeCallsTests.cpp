@@ -189,8 +189,9 @@ TEST_F(CallsOfAMerge, OfACleanMergeAreTheseInOrder)
                  "git_index_open", "git_repository_set_index", "git_index_set_caps",
                  "git_index_free", "git_repository_state"},
                 lookBeforeAMerge_,
-                {"git_merge", "git_repository_index", "git_index_has_conflicts",
-                 "git_reference_dwim", "git_reference_free", "git_repository_open_ext"}});
+                {"git_reference_name_to_id", "git_oid_fmt", "git_oid_fmt", "git_merge",
+                 "git_repository_index", "git_index_has_conflicts", "git_reference_dwim",
+                 "git_reference_free", "git_repository_open_ext"}});
     ASSERT_GE(calls.steps().size(), expected.size());
     const auto size = static_cast<std::ptrdiff_t>(expected.size());
     const Calls first(calls.steps().begin(), calls.steps().begin() + size);

@@ -1,0 +1,40 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <string>
+
+#include <git2/types.h>
+
+struct git_oid;
+
+namespace vclink::git
+{
+
+/// A file in the repository's folder that stands while libgit2 merges: `vclink-merge`, with the ids
+/// of HEAD and of the commit that is merged. If the process is killed, it stays, and tells the next
+/// commit that not all of the other side's work may have been written.
+class MergeMarker
+{
+  public:
+    /// To be made while the index is locked and no merge is under way: what is left of an earlier
+    /// merge goes. git_reference_name_to_id.
+    /// @throws LibGit2Exception if the file can't be written
+    MergeMarker(git_repository *repository, const git_annotated_commit *theirs);
+    MergeMarker(const MergeMarker &) = delete;
+    MergeMarker &operator=(const MergeMarker &) = delete;
+    ~MergeMarker();
+
+  private:
+    std::string path_;
+};
+
+/// Whether a merge of `theirs` into `head` has been cut short in this repository. A marker that was
+/// itself cut short counts.
+/// @throws LibGit2Exception if that can't be found out
+bool hasMergeMarker(git_repository *repository, const git_oid &head, const git_oid &theirs);
+
+/// Removes the marker of a merge that is over. To be called while the index is locked and no merge
+/// is under way.
+void removeMergeMarker(git_repository *repository) noexcept;
+
+} // namespace vclink::git
