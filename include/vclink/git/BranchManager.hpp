@@ -22,6 +22,10 @@ namespace vclink::git
 /// Unless an operation says otherwise it throws LibGit2Exception, with libgit2's text, when a call
 /// to libgit2 fails, and nothing has changed then. A name or revision with a NUL character is
 /// refused with GIT_EINVALIDSPEC before anything is opened. The order of the operations is binding.
+///
+/// switchBranch and merge hold git's lock of the index while they work. While something else holds
+/// it, they fail with GIT_ELOCKED before anything is written. A reference that is locked is tried
+/// again for `core.filesRefLockTimeout` milliseconds, 100 by default, one minute if negative.
 class VCLINK_GIT_EXPORT BranchManager
 {
   public:

@@ -61,9 +61,11 @@ class VCLINK_GIT_EXPORT GitAdapterFactory : public vclink::CMAdapterFactory
     ///   host's name; raises the exception of shared_vclink::git::NoUserName when there is neither,
     ///   and boost::system::system_error when the host has no name to be found. Files in conflict
     ///   are taken as they stand, markers included. A file that a sparse checkout leaves out stays
-    ///   as the index has it; one that can't be read makes the commit fail. After a failure HEAD,
-    ///   and the state of a merge, are as before, and the index may hold the changes already; only
-    ///   when the state can't be cleaned up does the commit stand.
+    ///   as the index has it; one that can't be read makes the commit fail. Refuses, with the class
+    ///   GIT_ERROR_MERGE and a text that names the way out, to conclude a merge whose process was
+    ///   killed; nothing has changed then. After a failure HEAD, and the state of a merge, are as
+    ///   before, and the index may hold the changes already; the commit stands only if the state
+    ///   can't be cleaned up or the new commit can't be read.
     ///   git_index_update_all, git_commit_create, git_repository_state_cleanup.
     /// - revertFiles: throws away all changes to the files, staged or not, and brings back missing
     ///   ones; a file that HEAD does not have leaves the index and stays on the disk. As in git,
@@ -76,8 +78,13 @@ class VCLINK_GIT_EXPORT GitAdapterFactory : public vclink::CMAdapterFactory
     ///   After any other failure of the checkout the files may be restored in part.
     ///   git_reset_default, git_checkout_index.
     /// - getRootFolder: `root`.
-    /// The index on disk is written whole or not at all. While another process holds its lock, the
-    /// operations that change it fail and change nothing.
+    /// The index on disk is written whole or not at all. Operations that change it hold git's lock,
+    /// `index.lock`, from before they read it. While something else holds the lock, another
+    /// operation of this process included, they throw LibGit2Exception with the code GIT_ELOCKED
+    /// and the lock's name, and change nothing. The library removes no lock that it has not made.
+    ///
+    /// A commit tries again for `core.filesRefLockTimeout` milliseconds, 100 by default, if its
+    /// branch is locked.
     ///
     /// @param root the root of the working tree
     /// @param interactor not null; shared for the adapter's life
