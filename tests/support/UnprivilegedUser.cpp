@@ -1,19 +1,13 @@
 // SPDX-License-Identifier: MIT
 #include "support/UnprivilegedUser.hpp"
 
-#include <array>
 #include <cerrno>
-#include <csignal>
-#include <cstdio>
-#include <exception>
-#include <string_view>
 #include <system_error>
 
-#include <fcntl.h>
 #include <grp.h>
-#include <poll.h>
-#include <sys/wait.h>
 #include <unistd.h>
+
+#include "support/ChildProcess.hpp"
 
 namespace vclink::test
 {
@@ -22,10 +16,6 @@ namespace
 
 constexpr uid_t nobody = 65534;
 constexpr gid_t nogroup = 65534;
-
-/// Comes after what the action answered, so that a child that ended early is told from one whose
-/// answer is empty.
-constexpr char endOfAnswer = '\0';
 
 [[noreturn]] void raise(const char *what)
 {
@@ -40,111 +30,18 @@ void dropPrivileges()
         raise("dropping privileges");
 }
 
-std::string answer(const std::function<std::string()> &action)
-{
-    try
-    {
-        dropPrivileges();
-        return action();
-    }
-    catch (const std::exception &exception)
-    {
-        return std::string("exception: ") + exception.what();
-    }
-    catch (...)
-    {
-        return "exception of a type that has no text";
-    }
-}
-
-[[noreturn]] void runChild(const std::function<std::string()> &action, int answerEnd)
-{
-    const std::string text = answer(action) + endOfAnswer;
-    for (std::size_t done = 0; done < text.size();)
-    {
-        const auto written = ::write(answerEnd, text.data() + done, text.size() - done);
-        if (written < 0)
-            break;
-        done += static_cast<std::size_t>(written);
-    }
-    // Neither the exit handlers nor the leak check of the parent's memory are the child's affair.
-    std::fflush(nullptr);
-    ::_exit(0);
-}
-
-/// Reads until the child closed its end, or the time is over.
-/// @return whether the child closed its end
-bool readAnswer(int answerEnd, std::chrono::milliseconds timeout, std::string &text)
-{
-    const auto end = std::chrono::steady_clock::now() + timeout;
-    for (;;)
-    {
-        const auto left = std::chrono::duration_cast<std::chrono::milliseconds>(
-            end - std::chrono::steady_clock::now());
-        pollfd event{answerEnd, POLLIN, 0};
-        const int ready = ::poll(&event, 1, left.count() > 0 ? static_cast<int>(left.count()) : 0);
-        if (ready < 0 && errno == EINTR)
-            continue;
-        if (ready <= 0)
-            return false;
-        std::array<char, 4096> block;
-        const auto count = ::read(answerEnd, block.data(), block.size());
-        if (count <= 0)
-            return true;
-        text.append(block.data(), static_cast<std::size_t>(count));
-    }
-}
-
-int waitForStatus(pid_t child)
-{
-    int status = 0;
-    while (::waitpid(child, &status, 0) < 0)
-    {
-        if (errno != EINTR)
-            raise("waitpid");
-    }
-    return status;
-}
-
 } // namespace
 
 std::string runAsUnprivilegedUser(const std::function<std::string()> &action,
                                   std::chrono::milliseconds timeout)
 {
-    // What is still buffered would be written by both processes.
-    std::fflush(nullptr);
-    std::array<int, 2> ends{};
-    if (::pipe2(ends.data(), O_CLOEXEC) != 0)
-        raise("pipe2");
-    const pid_t child = ::fork();
-    if (child == 0)
-    {
-        ::close(ends[0]);
-        runChild(action, ends[1]);
-    }
-    const int forkError = errno;
-    ::close(ends[1]);
-    if (child < 0)
-    {
-        ::close(ends[0]);
-        errno = forkError;
-        raise("fork");
-    }
-
-    std::string text;
-    const bool inTime = readAnswer(ends[0], timeout, text);
-    ::close(ends[0]);
-    if (!inTime)
-        ::kill(child, SIGKILL);
-    const int status = waitForStatus(child);
-    if (!inTime)
-        return "the child process took too long";
-    if (WIFSIGNALED(status))
-        return "the child process ended by signal " + std::to_string(WTERMSIG(status));
-    if (text.empty() || text.back() != endOfAnswer)
-        return "the child process ended early, with status " + std::to_string(WEXITSTATUS(status));
-    text.pop_back();
-    return text;
+    return runInChild(
+        [&action]
+        {
+            dropPrivileges();
+            return action();
+        },
+        timeout);
 }
 
 void giveToUnprivilegedUser(const std::filesystem::path &path)

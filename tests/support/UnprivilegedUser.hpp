@@ -11,10 +11,7 @@ namespace vclink::test
 
 /// Runs `action` in a child process that has no privileges: as the user and group "nobody" when the
 /// tests run as root, otherwise as who runs them. For what root is never refused.
-/// @param action answers with what went wrong, an empty text if nothing did; an exception of it
-///        counts as its text. Failures of GoogleTest's own assertions in it are not seen.
-/// @return what `action` answered, or how else the child ended (a signal, no end within `timeout`)
-/// @throws std::system_error when the child can't be made
+/// Otherwise as runInChild().
 std::string
 runAsUnprivilegedUser(const std::function<std::string()> &action,
                       std::chrono::milliseconds timeout = std::chrono::milliseconds(60'000));
