@@ -1,0 +1,59 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <filesystem>
+#include <functional>
+#include <string>
+#include <vector>
+
+#include "support/GitRepository.hpp"
+
+namespace vclink::test
+{
+
+/// What a place holds in the commit that a situation begins with.
+enum class Holds
+{
+    nothing,
+    file,
+    folder
+};
+
+/// Where an obstacle stands, and what the other branch does there.
+struct Place
+{
+    std::string name;
+    Holds holds;
+    bool isCommon;
+    std::string path;
+    /// a branch of the working copy that makeSurroundings() makes
+    std::string branch;
+};
+
+/// Something in a working copy that is not as it was committed.
+struct Obstacle
+{
+    std::string name;
+    /// the places where it can be put
+    Holds place;
+    bool isCommon;
+    std::function<void(const GitRepository &copy, const std::string &path)> put;
+    /// an operation might wait for it for ever
+    bool mayBlock = false;
+};
+
+const std::vector<Place> &allPlaces();
+const std::vector<Obstacle> &allObstacles();
+
+/// Makes "copy", a working copy on "main", and "outside" in a folder. Each place's branch follows
+/// the one commit of main and also changes the first and the last file; "ours" follows it with a
+/// change of a file that no other branch touches.
+void makeSurroundings(const std::filesystem::path &folder);
+
+/// Copies what makeSurroundings() has made.
+void copySurroundings(const std::filesystem::path &from, const std::filesystem::path &to);
+
+/// Puts the files and the index back to what makeSurroundings() has made, and nothing else.
+void clearSurroundings(const std::filesystem::path &original, const std::filesystem::path &folder);
+
+} // namespace vclink::test

@@ -1,0 +1,139 @@
+// SPDX-License-Identifier: MIT
+#include "Situation.hpp"
+
+#include <map>
+#include <stdexcept>
+
+#include "differential/quoting.hpp"
+
+namespace vclink::test
+{
+namespace
+{
+
+namespace fs = std::filesystem;
+
+/// Paths with contents; "-" takes one away.
+using Files = std::map<std::string, std::string>;
+
+const Files committed{{"a first", "first\n"}, {"d/file", "deep\n"},     {"file", "of main\n"},
+                      {"mine", "mine\n"},     {"other", "untouched\n"}, {"t/file", "of main\n"},
+                      {"t/keep", "kept\n"},   {"zz last", "last\n"}};
+
+const std::map<std::string, Files> branches{
+    {"adds", {{"new", "theirs\n"}, {"t/new", "theirs\n"}, {"u/new", "theirs\n"}}},
+    {"modifies", {{"file", "theirs\n"}, {"t/file", "theirs\n"}}},
+    {"deletes", {{"file", "-"}, {"t/file", "-"}}},
+    {"unrelated", {{"t/different", "theirs\n"}, {"u/different", "theirs\n"}}},
+    {"folders",
+     {{"new/a", "theirs\n"},
+      {"t/new/a", "theirs\n"},
+      {"u/new/a", "theirs\n"},
+      {"file", "-"},
+      {"file/a", "theirs\n"},
+      {"t/file", "-"},
+      {"t/file/a", "theirs\n"}}},
+    {"files",
+     {{"new", "theirs\n"}, {"t/file", "-"}, {"t/keep", "-"}, {"t/s/file", "-"}, {"t", "theirs\n"}}},
+    {"ours", {{"mine", "of ours\n"}}}};
+
+std::string commitOf(const std::string &branch, const Files &files)
+{
+    std::string stream = "commit refs/heads/" + branch +
+                         "\ncommitter A <a@example.com> 1577836800 +0000\n" +
+                         asFastImportData(branch);
+    if (branch != "main")
+        stream += "from refs/heads/main\n";
+    for (const auto &[path, content] : files)
+        if (content == "-")
+            stream += "D \"" + path + "\"\n";
+    for (const auto &[path, content] : files)
+        if (content != "-")
+            stream += "M 100644 inline \"" + path + "\"\n" + asFastImportData(content);
+    return stream;
+}
+
+void copyFiles(const fs::path &from, const fs::path &to)
+{
+    fs::copy(from, to, fs::copy_options::recursive | fs::copy_options::copy_symlinks);
+}
+
+} // namespace
+
+const std::vector<Place> &allPlaces()
+{
+    constexpr bool common = true;
+    constexpr bool rare = false;
+    static const std::vector<Place> places{
+        {"a new file", Holds::nothing, common, "new", "adds"},
+        {"a new file below a tracked folder", Holds::nothing, rare, "t/new", "adds"},
+        {"a new file below an untracked folder", Holds::nothing, rare, "u/new", "adds"},
+        {"at the top, left alone", Holds::nothing, common, "new", "unrelated"},
+        {"below a tracked folder, left alone", Holds::nothing, rare, "t/new", "unrelated"},
+        {"below an untracked folder, left alone", Holds::nothing, rare, "u/new", "unrelated"},
+        {"a new folder", Holds::nothing, common, "new", "folders"},
+        {"a new folder below a tracked one", Holds::nothing, rare, "t/new", "folders"},
+        {"in a folder where a file comes", Holds::nothing, common, "new/x", "files"},
+        {"in a tracked folder that becomes a file", Holds::nothing, common, "t/new", "files"},
+        {"a modified file", Holds::file, common, "file", "modifies"},
+        {"a modified file below a folder", Holds::file, rare, "t/file", "modifies"},
+        {"a deleted file", Holds::file, common, "file", "deletes"},
+        {"a deleted file below a folder", Holds::file, rare, "t/file", "deletes"},
+        {"a file left alone", Holds::file, common, "file", "unrelated"},
+        {"a file left alone below a folder", Holds::file, rare, "t/file", "unrelated"},
+        {"a file that becomes a folder", Holds::file, common, "file", "folders"},
+        {"in a folder that becomes a file", Holds::file, common, "t/file", "files"},
+        {"a folder with a modified file", Holds::folder, common, "t", "modifies"},
+        {"a folder with a deleted file", Holds::folder, rare, "t", "deletes"},
+        {"a folder with a new file", Holds::folder, rare, "t", "adds"},
+        {"a folder that becomes a file", Holds::folder, common, "t", "files"},
+        {"a folder left alone", Holds::folder, rare, "d", "unrelated"},
+    };
+    return places;
+}
+
+void makeSurroundings(const fs::path &folder)
+{
+    const auto copy = GitRepository::init(folder / "copy");
+    copy.git({"config", "core.logAllRefUpdates", "false"});
+    copy.write("../outside/file", "outside\n");
+    copy.write("../outside/keep", "outside\n");
+    copy.write("../outside/new", "outside\n");
+    std::string stream = commitOf("main", committed);
+    for (auto [branch, files] : branches)
+    {
+        files["a first"] = "first of " + branch + '\n';
+        files["zz last"] = "last of " + branch + '\n';
+        if (branch == "ours")
+            files = branches.at(branch);
+        stream += commitOf(branch, files);
+    }
+    const auto import =
+        copy.command({"-c", "fastimport.unpackLimit=1", "fast-import", "--quiet"}).input(stream);
+    const auto result = import.run();
+    if (!result.succeeded())
+        throw std::runtime_error(import.text() + ": " + result.errors);
+    copy.git({"pack-refs", "--all"});
+    copy.git({"reset", "--quiet", "--hard"});
+    copy.write(".git/info/exclude", "");
+}
+
+void copySurroundings(const fs::path &from, const fs::path &to)
+{
+    fs::create_directories(to);
+    copyFiles(from, to);
+}
+
+void clearSurroundings(const fs::path &original, const fs::path &folder)
+{
+    for (const auto &entry : fs::directory_iterator(folder / "copy"))
+        if (entry.path().filename() != ".git")
+            fs::remove_all(entry.path());
+    for (const auto &entry : fs::directory_iterator(original / "copy"))
+        if (entry.path().filename() != ".git")
+            copyFiles(entry.path(), folder / "copy" / entry.path().filename());
+    fs::copy_file(original / "copy/.git/index", folder / "copy/.git/index",
+                  fs::copy_options::overwrite_existing);
+}
+
+} // namespace vclink::test

@@ -1,0 +1,39 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <string>
+#include <vector>
+
+namespace vclink::test
+{
+
+/// What git and the library do in the same situation.
+struct Comparand
+{
+    std::string operation;
+    std::string obstacle;
+    std::string place;
+    /// "goes through" or "refuses"
+    std::string git;
+    /// "goes through", "refuses", or "leaves something else" where git goes through as well
+    std::string library;
+};
+
+/// Situations in which the library is not as git is, and why.
+struct SurroundingDifference
+{
+    std::vector<std::string> operations;
+    /// none for any
+    std::vector<std::string> obstacles;
+    /// the whole name, or how it begins, with a '*'
+    std::string place;
+    std::string git;
+    std::string library;
+    std::string reason;
+
+    bool explains(const Comparand &comparand) const;
+};
+
+const std::vector<SurroundingDifference> &surroundingDifferences();
+
+} // namespace vclink::test
