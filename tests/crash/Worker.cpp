@@ -23,7 +23,8 @@ namespace
 
 namespace fs = std::filesystem;
 
-constexpr int filesInFolder = 25;
+/// Each of them has a command started.
+constexpr int drivenFiles = 4;
 constexpr int linesInFile = 60;
 
 /// In one piece and unbuffered, so that nothing that has happened is unsaid.
@@ -64,12 +65,14 @@ void Worker::prepare(const std::string &operation)
     if (operation == "commit" || operation == "revertFiles" || operation == "push")
         change("ours");
     else if (operation != "fetch" && operation != "generate" && operation != "writeConfig")
-        advanceTopic();
+        advanceTopic(operation == "mergeDriven");
     if (operation == "push")
         commit();
-    if (operation == "mergeThreeWay")
+    if (operation == "mergeThreeWay" || operation == "mergeDriven")
     {
         change("ours");
+        if (operation == "mergeDriven")
+            change("driven", drivenFiles);
         commit();
     }
     if (operation == "generate")
@@ -84,7 +87,7 @@ void Worker::call(const std::string &operation)
         revertAll();
     else if (operation == "switchBranch")
         branches_->switchBranch("topic");
-    else if (operation == "mergeFastForward" || operation == "mergeThreeWay")
+    else if (operation.compare(0, 5, "merge") == 0)
         branches_->merge("topic");
     else if (operation == "fetch")
         git::GitRemote::create("upstream", *adapter_)
@@ -101,10 +104,10 @@ void Worker::call(const std::string &operation)
         throw std::out_of_range(operation);
 }
 
-void Worker::change(const std::string &folder)
+void Worker::change(const std::string &folder, int files)
 {
     fs::create_directories(root_ / folder);
-    for (int file = 0; file < filesInFolder; ++file)
+    for (int file = 0; file < files; ++file)
     {
         std::ofstream stream(root_ / folder / std::to_string(file));
         // Of another size each time: git may take an edit that keeps the size for none within the
@@ -126,12 +129,14 @@ void Worker::commit()
     adapter_->commit(upath(), u"work");
 }
 
-void Worker::advanceTopic()
+void Worker::advanceTopic(bool isDriven)
 {
     if (branches_->getCurrentBranch().getName() != "topic")
         branches_->switchBranch("topic");
     branches_->merge("main");
     change("theirs");
+    if (isDriven)
+        change("driven", drivenFiles);
     commit();
     branches_->switchBranch("main");
 }

@@ -32,11 +32,12 @@ class Worker
     void prepare(const std::string &operation);
     void call(const std::string &operation);
 
-    /// Changes every file of a folder of the working copy.
-    void change(const std::string &folder);
+    /// Changes these many files of a folder of the working copy.
+    void change(const std::string &folder, int files = 25);
     void commit();
     /// Leaves on "topic" what main lacks, and HEAD on main.
-    void advanceTopic();
+    /// With files that main will change as well, and that a command merges, if it is driven.
+    void advanceTopic(bool isDriven);
     void revertAll();
     void removeUnversioned();
     std::string head() const;

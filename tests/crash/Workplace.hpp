@@ -38,9 +38,7 @@ class Workplace
     /// Removes the locks of a dead process.
     /// @return how many there were
     std::size_t removeLocks() const;
-    /// Aborts a merge that is under way.
-    /// @return whether there was one
-    bool abortMerge() const;
+    bool isMerging() const;
 
   private:
     std::filesystem::path folder_;

@@ -22,9 +22,10 @@ namespace fs = std::filesystem;
 using git::acquire;
 using git::OwnedHandle;
 
+/// Without AUTO_MERGE, which git leaves where it ends a merge.
 constexpr std::array filesUnderWay{
-    "MERGE_HEAD",   "MERGE_MSG",  "MERGE_MODE", "AUTO_MERGE",  "CHERRY_PICK_HEAD", "REVERT_HEAD",
-    "vclink-merge", "index.lock", "HEAD.lock",  "config.lock", "packed-refs.lock"};
+    "MERGE_HEAD",   "MERGE_MSG",  "MERGE_MODE", "CHERRY_PICK_HEAD", "REVERT_HEAD",
+    "vclink-merge", "index.lock", "HEAD.lock",  "config.lock",      "packed-refs.lock"};
 
 std::string readFile(const fs::path &file)
 {
