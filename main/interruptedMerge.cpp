@@ -24,6 +24,7 @@
 #include "error/errorUtil/raiseGitError.hpp"
 #include "error/errorUtil/raiseSystemError.hpp"
 #include "main/MergeMarker.hpp"
+#include "main/checkout/ids.hpp"
 #include "util/FileDescriptor.hpp"
 #include "util/repository.hpp"
 
@@ -96,7 +97,7 @@ struct File
 
     bool operator==(const File &other) const
     {
-        return mode == other.mode && (mode == 0 || git_oid_equal(&id, &other.id) != 0);
+        return mode == other.mode && (mode == 0 || isSameId(id, other.id));
     }
 };
 
@@ -182,7 +183,7 @@ void refuseInterruptedMerge(git_repository *repository, const git_commit *ours,
                             const git_commit *theirs)
 {
     const std::string folder = git_repository_path(repository);
-    const bool isSame = git_oid_equal(git_commit_tree_id(ours), git_commit_tree_id(theirs)) != 0;
+    const bool isSame = isSameId(*git_commit_tree_id(ours), *git_commit_tree_id(theirs));
     if (isSame || exists(folder + "AUTO_MERGE"))
     {
         return;

@@ -30,6 +30,8 @@ struct Tolerance
     std::size_t call = any;
     int code = any;
     std::string outcome;
+    /// whether only the call that has done its work is tolerated
+    bool isAfter = false;
 };
 
 /// The function and how the names of its operations begin.
@@ -154,7 +156,12 @@ std::vector<Tolerance> tolerancesOfOthers(const std::string &operation, const st
         {"getRepositoryState", "git_repository_state", any, any, "done: "},
         // Any state but the normal one refuses the merge, any answer but no means conflicts.
         {"merge", "git_repository_state", 1, any, badState},
-        {"merge", "git_repository_state", 2, any, normal},
+        {"merge", "git_repository_state", 2, any, badState},
+        {"merge", "git_repository_state", 3, any, normal},
+        // The index has what only the other side has changed, from wherever both began.
+        {"merge", "git_merge_base", any, GIT_ENOTFOUND, normal},
+        // The library ends the comparison itself as soon as it has seen something of that.
+        {"merge", "git_diff_tree_to_tree", any, any, normal, true},
         {"merge", "git_index_has_conflicts", any, any, hasConflicts},
         // The first look-up chooses the words of the message, the second is the commit's, after
         // those of the look before the merge.
@@ -200,7 +207,8 @@ std::string expectedOutcome(const FaultSite &site, const std::string &normal)
                          return begins(site.operation, tolerance.operations) &&
                                 site.fault.function == tolerance.function &&
                                 (tolerance.call == any || tolerance.call == site.fault.call) &&
-                                (tolerance.code == any || tolerance.code == site.fault.code);
+                                (tolerance.code == any || tolerance.code == site.fault.code) &&
+                                (!tolerance.isAfter || site.fault.when == When::After);
                      });
     return found != tolerances.end()
                ? found->outcome
