@@ -258,6 +258,10 @@ Finding CheckoutWatch::clearAll(const CheckoutNotice &notice)
         return {};
     }
     const bool isPast = notice.why == GIT_CHECKOUT_NOTIFY_UPDATED && notice.workdir == nullptr;
+    if (notice.workdir != nullptr)
+    {
+        replaced_ = notice.workdir->path;
+    }
     const std::string name = notice.path;
     for (auto end = name.find('/'); end != std::string::npos; end = name.find('/', end + 1))
     {
@@ -267,7 +271,7 @@ Finding CheckoutWatch::clearAll(const CheckoutNotice &notice)
         {
             cleared_.remove(root_ + above);
         }
-        else if (standing == Standing::File && isPast)
+        else if (standing == Standing::File && isPast && above != replaced_)
         {
             return inTheWay(above, standing);
         }

@@ -71,6 +71,8 @@ class CheckoutWatch
     /// Empty until the look before; a revert needs none.
     std::optional<WorkingCopy> copy_;
     bool hasHeard_ = false;
+    /// What libgit2 itself replaces, as the last notification with something there has told.
+    std::string replaced_;
     ClearedWay cleared_;
 };
 

@@ -4,9 +4,9 @@
 #include <cerrno>
 #include <climits>
 #include <cstddef>
-#include <filesystem>
-#include <system_error>
+#include <memory>
 
+#include <dirent.h>
 #include <sys/stat.h>
 #include <unistd.h>
 
@@ -46,17 +46,28 @@ bool holdsFiles(const std::string &path)
     {
         return false;
     }
-    namespace fs = std::filesystem;
-    std::error_code error;
-    fs::recursive_directory_iterator entry(path, error);
-    for (; !error && entry != fs::recursive_directory_iterator(); entry.increment(error))
+    // The iterators of the standard library end the process if memory runs out.
+    const std::unique_ptr<DIR, int (*)(DIR *)> folder(::opendir(path.c_str()), ::closedir);
+    if (folder == nullptr)
     {
-        if (entry->symlink_status(error).type() != fs::file_type::directory)
+        return true;
+    }
+    errno = 0;
+    while (const dirent *const entry = ::readdir(folder.get()))
+    {
+        const std::string name = entry->d_name;
+        if (name == "." || name == "..")
+        {
+            continue;
+        }
+        const std::string inside = path + '/' + name;
+        if (standingAt(inside) != Standing::Folder || holdsFiles(inside))
         {
             return true;
         }
+        errno = 0;
     }
-    return static_cast<bool>(error);
+    return errno != 0;
 }
 
 std::string readLink(const std::string &path)

@@ -124,7 +124,7 @@ TEST_F(DifferencesFromGit, ASubmoduleWhosePathHoldsALineFeedHidesAllStates)
     EXPECT_EQ(statesOf(repository), States());
 }
 
-// git takes the file away; libgit2 makes no folder where a file stands. The index is put back
+// git takes the file away; a revert of what belongs below it is refused. The index is put back
 // first.
 TEST_F(DifferencesFromGit, AFileThatTookTheirFoldersPlaceIsInTheWayOfARevert)
 {
@@ -142,7 +142,7 @@ TEST_F(DifferencesFromGit, AFileThatTookTheirFoldersPlaceIsInTheWayOfARevert)
     }
     catch (const LibGit2Exception &exception)
     {
-        EXPECT_EQ(exception.getError().getCode(), GIT_EEXISTS);
+        EXPECT_EQ(exception.getError().getCode(), GIT_ECONFLICT);
     }
     EXPECT_EQ(repository.read("folder"), "instead");
     EXPECT_EQ(statusOf(repository), " D folder/file\n?? folder\n");

@@ -161,7 +161,9 @@ std::vector<Tolerance> tolerancesOfOthers(const std::string &operation, const st
         // The index has what only the other side has changed, from wherever both began.
         {"merge", "git_merge_base", any, GIT_ENOTFOUND, normal},
         // The library ends the comparison itself as soon as it has seen something of that.
-        {"merge", "git_diff_tree_to_tree", any, any, normal, true},
+        {"mergeThreeWay", "git_diff_tree_to_tree", any, any, normal, true},
+        {"mergeBesideHidden", "git_diff_tree_to_tree", any, any, normal, true},
+        {"mergeOverIgnored", "git_diff_tree_to_tree", any, any, normal, true},
         {"merge", "git_index_has_conflicts", any, any, hasConflicts},
         // The first look-up chooses the words of the message, the second is the commit's, after
         // those of the look before the merge.

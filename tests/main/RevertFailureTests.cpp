@@ -206,8 +206,8 @@ TEST_F(RevertFailure, OfAFolderWhereAFileStandsNowLeavesTheFile)
     expected.index = committedIndex();
     expected.index["file"] = indexOf(repository_).at("file");
     EXPECT_EQ(failureOf([this] { revert({"sub/inside"}); }),
-              (Failure{GIT_EEXISTS, GIT_ERROR_FILESYSTEM,
-                       "failed to make directory '" + path("sub") + "': directory exists"}));
+              (Failure{GIT_ECONFLICT, GIT_ERROR_CHECKOUT,
+                       "the untracked file 'sub' is in the way of the checkout"}));
     EXPECT_EQ(stateOf(repository_), expected);
 }
 
@@ -222,10 +222,9 @@ TEST_F(RevertFailure, OfALinkThatCannotBeRemovedWritesNothingThroughIt)
     RepositoryState expected = stateOf(repository_);
     expected.index = committedIndex();
     expected.index["file"] = indexOf(repository_).at("file");
-    EXPECT_EQ(
-        unprivilegedFailureOf([this] { revert({"sub"}); }),
-        printed({GIT_ERROR, GIT_ERROR_OS,
-                 "could not remove the link '" + path("sub/inside") + "': Permission denied"}));
+    EXPECT_EQ(unprivilegedFailureOf([this] { revert({"sub"}); }),
+              printed({GIT_ERROR, GIT_ERROR_OS,
+                       "could not remove '" + path("sub/inside") + "': Permission denied"}));
     EXPECT_EQ(stateOf(repository_), expected);
     EXPECT_EQ(repository_.read("../outside"), "precious");
     repository_.setMode("sub", 0755);
