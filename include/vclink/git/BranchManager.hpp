@@ -56,8 +56,8 @@ class VCLINK_GIT_EXPORT BranchManager
 
     /// Checks a local branch out and moves HEAD to it. Changes of the user that the branch does not
     /// touch stay. The switch is refused before anything is written if it would lose uncommitted
-    /// changes, staged or not, or untracked files, and if a symbolic link, FIFO, socket or device is
-    /// in its way. An ignored file that the branch tracks is overwritten. If a tag has the same
+    /// changes, staged or not, or untracked files, and if a symbolic link, FIFO, socket or device
+    /// is in its way. An ignored file that the branch tracks is overwritten. If a tag has the same
     /// name, its tree is checked out. Reports progress. After a failure or a cancellation HEAD is
     /// where it was; the files are too, unless one of them, or HEAD itself, couldn't be written.
     /// git_branch_lookup, git_revparse_single, git_checkout_tree, git_repository_set_head.
@@ -85,11 +85,11 @@ class VCLINK_GIT_EXPORT BranchManager
     /// commit, running the merge drivers that the repository's configuration and attributes name.
     /// Reports progress.
     ///
-    /// A fast-forward is refused as switchBranch is. A merge that is none is refused before anything
-    /// is written if any tracked file has uncommitted changes, even one that the merge does not
-    /// touch, and if it would overwrite an untracked file, or a symbolic link, FIFO, socket or
-    /// device is in its way; the added text names the first file. The merge drivers may have run by
-    /// then. Missing files come back, ignored ones are overwritten.
+    /// A fast-forward is refused as switchBranch is. A merge that is none is refused before
+    /// anything is written if any tracked file has uncommitted changes, even one that the merge
+    /// does not touch, and if it would overwrite an untracked file, or a symbolic link, FIFO,
+    /// socket or device is in its way; the added text names the first file. The merge drivers may
+    /// have run by then. Missing files come back, ignored ones are overwritten.
     ///
     /// After conflicts the repository is in the state of a merge, with markers in the files in
     /// conflict, save those that are not text, which are ours: CMAdapter::markResolved and

@@ -40,8 +40,8 @@ class VCLINK_GIT_EXPORT GitWorkingCopyGenerator : public vclink::WorkingCopyGene
     /// @param repositorySpecifier a URL, `user@host:path`, or a path on this machine, which may be
     /// relative to the process's working folder; taken as it stands
     /// @param sandboxRoot the folder of the working copy: missing, or empty; taken as it stands
-    /// @throws LibGit2Exception; with GIT_EINVALIDSPEC, and nothing made, for an argument with a NUL
-    /// character
+    /// @throws LibGit2Exception; with GIT_EINVALIDSPEC, and nothing made, for an argument with a
+    /// NUL character
     /// @throws vclink::util::exception::CancelledOperationException when the application asks for
     /// it, during the transfer or at the next file of the checkout
     void generate(const ustring &repositorySpecifier, const upath &sandboxRoot) override;
