@@ -162,7 +162,8 @@ bool isNothingTaken(git_repository *repository, const git_commit *ours, const gi
     const OwnedHandle<git_tree> theirsTree = treeOf(theirs);
     const OwnedHandle<git_index> index = getRepositoryIndex(repository);
     Search search{oursTree.get(), index.get()};
-    git_diff_options options = GIT_DIFF_OPTIONS_INIT;
+    git_diff_options options{};
+    makeResult(git_diff_options_init(&options, GIT_DIFF_OPTIONS_VERSION)).value();
     options.notify_cb = lookAt;
     options.payload = &search;
     git_diff *raw = nullptr;

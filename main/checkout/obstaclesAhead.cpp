@@ -118,10 +118,13 @@ Finding findUntracked(WorkingCopy &copy, const TreeChange &change)
         return {};
     }
     const Standing standing = copy.at(change.path);
-    const bool isKeptFolder = standing == Standing::Folder &&
-                              (copy.isFolderInHead(change.path) || !copy.holdsFiles(change.path));
-    if (standing == Standing::Nothing || isKeptFolder ||
-        (standing != Standing::Special && copy.isIgnored(change.path)))
+    // Where ours has deleted the file libgit2 opens whatever is there, and fails at a folder.
+    const bool isOpened =
+        standing == Standing::Special || (standing == Standing::Folder && change.before != nullptr);
+    const bool isKeptFolder =
+        standing == Standing::Folder &&
+        (copy.isFolderInHead(change.path) || (!isOpened && !copy.holdsFiles(change.path)));
+    if (standing == Standing::Nothing || isKeptFolder || (!isOpened && copy.isIgnored(change.path)))
     {
         return {};
     }

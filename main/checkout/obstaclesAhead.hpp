@@ -33,7 +33,8 @@ Finding findStagedContent(WorkingCopy &copy, const TreeChange &change);
 
 /// As findBlockedWay; ignored links and files do not count.
 Finding findBlockedWayOfMerge(WorkingCopy &copy, const TreeChange &change);
-/// Something untracked where the other side has a file, unless it is ignored.
+/// Something untracked where the other side has a file, unless it is ignored or an empty folder. A
+/// folder is always in the way if ours has deleted the file and the other side has changed it.
 Finding findUntracked(WorkingCopy &copy, const TreeChange &change);
 /// The first file with a change that Git hides, since the file is marked skip-worktree or
 /// assume-unchanged. A merge would undo it, whether the other side touches the file or not.

@@ -280,7 +280,7 @@ TEST_F(MergeDriverEntry, StoresTheFailureOfAnySideAndRemovesTheFilesBefore)
         const Answer answer = apply();
         EXPECT_EQ(answer.code, GIT_EUSER);
         EXPECT_EQ(codeOf(answer.exception), GIT_EINVALID);
-        EXPECT_THAT(names_, Contains("git_odb_read").Times(static_cast<int>(failing)));
+        EXPECT_THAT(names_, Contains("git_odb_read").Times(failing));
         EXPECT_FALSE(answer.path);
     }
 }

@@ -186,6 +186,25 @@ TEST_F(MergeObstacles, AreNotIgnoredFilesWhichAreOverwrittenAsGitDoes)
     expectCleanAsGit();
 }
 
+/// libgit2 opens the name for writing, and tells of it too late to be refused.
+TEST_F(MergeObstacles, AreAllFoldersWhereWeDeletedAFileThatTheyChanged)
+{
+    diverge([&] { repository_.remove("file"); }, writing("file", "theirs\n"));
+    repository_.write(".git/info/exclude", "ignored\n");
+    for (const auto *name : {"file/mine", "file/ignored"})
+    {
+        repository_.write(name, "mine\n");
+        expectMergeRefused(inTheWay("folder 'file'"));
+        EXPECT_EQ(repository_.read(name), "mine\n");
+        repository_.remove(name);
+    }
+    expectMergeRefused(inTheWay("folder 'file'"));
+    repository_.write(".git/info/exclude", "file\n");
+    expectMergeRefused(inTheWay("folder 'file'"));
+    repository_.remove("file");
+    expectConflicts("topic");
+}
+
 TEST_F(MergeObstacles, AreNotIgnoredLinksWhichAreReplacedAsGitDoes)
 {
     theyWrite({"d/ignored", "ignored-folder/new"});
