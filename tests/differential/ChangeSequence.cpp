@@ -72,27 +72,31 @@ void ChangeSequence::begin()
 void ChangeSequence::change()
 {
     const std::size_t kind = random_.below(100);
-    if (kind < 20)
+    if (kind < 15)
     {
         return add();
     }
-    if (kind < 36)
+    if (kind < 27)
     {
         return remove();
     }
-    if (kind < 56)
+    if (kind < 41)
     {
         return revert();
     }
-    if (kind < 70)
+    if (kind < 51)
     {
         return markResolved();
     }
-    if (kind < 84 || !twins_.hasCommit() || twins_.isMerging())
+    if (kind < 62 || !twins_.hasCommit() || twins_.isMerging())
     {
         return commit();
     }
-    merge();
+    if (kind < 72)
+    {
+        return merge();
+    }
+    goOn();
 }
 
 void ChangeSequence::add()
@@ -182,10 +186,79 @@ void ChangeSequence::merge()
         aside.push_back({added, "100644", makeContent(random_)});
     }
     const std::string branch = "aside" + std::to_string(++branches_);
+    branchNames_.push_back(branch);
     twins_.branch(branch, aside);
     commit();
     const bool clean = twins_.merge(branch);
     count(clean ? "merge" : "merge with conflicts", {});
+}
+
+void ChangeSequence::goOn()
+{
+    const std::size_t kind = random_.below(4);
+    if (kind == 0)
+    {
+        return count("switch", twins_.switchTo(random_.pick(branchNames_)));
+    }
+    const std::string branch = makeBranch();
+    for (std::size_t edits = random_.below(4); edits > 0; --edits)
+    {
+        edit();
+    }
+    if (kind == 1)
+    {
+        return count("switch", twins_.switchTo(branch));
+    }
+    if (kind == 2)
+    {
+        return count("fast-forward", twins_.mergeByLibrary(branch));
+    }
+    const std::string path = freshPath();
+    if (!path.empty())
+    {
+        write(path, makeContent(random_));
+        twins_.add({path});
+    }
+    commit();
+    for (std::size_t edits = random_.below(3); edits > 0; --edits)
+    {
+        edit();
+    }
+    count("merge by the library", twins_.mergeByLibrary(branch));
+}
+
+std::string ChangeSequence::makeBranch()
+{
+    std::vector<PlannedFile> files;
+    for (std::size_t count = 1 + random_.below(4); count > 0; --count)
+    {
+        files.push_back(planInTheWay());
+    }
+    files.erase(std::remove_if(files.begin(), files.end(),
+                               [](const PlannedFile &file) { return file.path.empty(); }),
+                files.end());
+    branchNames_.push_back("aside" + std::to_string(++branches_));
+    twins_.branch(branchNames_.back(), files);
+    return branchNames_.back();
+}
+
+PlannedFile ChangeSequence::planInTheWay()
+{
+    const Names names = listable(isAnything);
+    std::string path = names.empty() || random_.chance(25) ? freshPath() : random_.pick(names);
+    if (path.empty() || random_.chance(20))
+    {
+        return {path, path.empty() ? "100644" : "", ""};
+    }
+    if (random_.chance(10))
+    {
+        path += "/below";
+    }
+    else if (random_.chance(10) && !folderOf(path).empty())
+    {
+        path = folderOf(path);
+    }
+    return planFile(path);
 }
 
 void ChangeSequence::count(const std::string &change, const std::string &refusal)

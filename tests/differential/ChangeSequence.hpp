@@ -43,6 +43,12 @@ class ChangeSequence
     void markResolved();
     void commit();
     void merge();
+    /// Goes to another branch, or takes one in, by the library.
+    void goOn();
+    /// Makes a branch, here and there of what is in the way of it in the working tree.
+    /// @return its name
+    std::string makeBranch();
+    PlannedFile planInTheWay();
 
     void count(const std::string &change, const std::string &refusal);
 
@@ -80,6 +86,7 @@ class ChangeSequence
     Twins twins_;
     std::map<std::string, int> counts_;
     Names made_;
+    Names branchNames_{"main"};
     int branches_ = 0;
     /// how far back the last file was dated that had to be
     std::chrono::hours hours_{0};

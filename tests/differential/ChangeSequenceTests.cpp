@@ -3,6 +3,7 @@
 #include <exception>
 #include <filesystem>
 #include <fstream>
+#include <iostream>
 #include <map>
 #include <string>
 
@@ -21,10 +22,16 @@ using vclink::test::ChangeSequence;
 constexpr std::uint64_t sequenceBlocks = 10;
 constexpr std::uint64_t sequencesInBlock = 30;
 
-/// 30 sequences a block; a block ends with the first that fails, and prints its seed and what was
-/// done. To run one sequence again, run this program with the seed in VCLINK_SEED; every block is
-/// that sequence alone then. VCLINK_KEEP besides names a path to which its working copies are moved
-/// in the end.
+std::uint64_t numberFrom(const char *variable, std::uint64_t otherwise)
+{
+    const char *const text = std::getenv(variable);
+    return text == nullptr ? otherwise : std::stoull(text);
+}
+
+/// 30 sequences a block, or as many as VCLINK_SEQUENCES says; a block ends with the first that
+/// fails, and prints its seed and what was done. VCLINK_FIRST is the first seed of all. To run one
+/// sequence again, run this program with the seed in VCLINK_SEED; every block is that sequence
+/// alone then. VCLINK_KEEP besides names a path to which its working copies are moved in the end.
 class ChangeSequences : public vclink::test::GitTest,
                         public testing::WithParamInterface<std::uint64_t>
 {
@@ -80,14 +87,21 @@ TEST_P(ChangeSequences, LeaveWhatGitLeaves)
     {
         return run(std::stoull(seed));
     }
-    const std::uint64_t first = GetParam() * sequencesInBlock;
-    for (auto seed = first; seed < first + sequencesInBlock && !HasFailure(); ++seed)
+    const std::uint64_t inBlock = numberFrom("VCLINK_SEQUENCES", sequencesInBlock);
+    const std::uint64_t first = numberFrom("VCLINK_FIRST", 0) + GetParam() * inBlock;
+    for (auto seed = first; seed < first + inBlock && !HasFailure(); ++seed)
     {
         run(seed);
     }
-    for (const auto *change : {"add", "add: AlreadyAdded", "commit", "commit of a merge",
-                               "markResolved", "merge", "merge with conflicts", "remove",
-                               "remove: NoFilesToRemove", "revert", "revert: Conflicted"})
+    std::cout << "seeds " << first << " to " << first + inBlock - 1 << '\n';
+    for (const auto &[change, count] : counts())
+    {
+        std::cout << "  " << count << " x " << change << '\n';
+    }
+    for (const auto *change :
+         {"add", "add: AlreadyAdded", "commit", "commit of a merge", "markResolved", "merge",
+          "merge with conflicts", "remove", "remove: NoFilesToRemove", "revert",
+          "revert: Conflicted", "switch: done", "switch: refused"})
     {
         EXPECT_EQ(counts().count(change), 1u) << change << ": the sequences are too much alike";
     }

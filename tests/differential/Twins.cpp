@@ -14,6 +14,8 @@
 #include "support/TestInteractor.hpp"
 #include "support/text.hpp"
 #include "vclink/git/GitAdapterFactory.hpp"
+#include "vclink/git/GitException.hpp"
+#include "vclink/git/LibGit2Exception.hpp"
 
 namespace vclink::test
 {
@@ -21,8 +23,6 @@ namespace
 {
 
 namespace fs = std::filesystem;
-
-const std::string mainBranch = ".git/refs/heads/main";
 
 void runImport(const Command &command)
 {
@@ -45,7 +45,7 @@ std::string makeStream(const std::string &branch, const std::vector<PlannedFile>
 {
     std::string stream = "commit refs/heads/" + branch +
                          "\ncommitter A <a@example.com> 1577836800 +0000\n" +
-                         asFastImportData("aside") + "from refs/heads/main^0\n";
+                         asFastImportData("aside") + "from HEAD^0\n";
     for (const auto &file : files)
     {
         stream += file.mode.empty() ? "D " + quote(file.path) + '\n'
@@ -117,8 +117,22 @@ std::string Twins::markResolved(const std::string &name)
 std::string Twins::commit(const std::string &message)
 {
     note("commit", {message});
-    return change([&](CMAdapter &adapter) { adapter.commit(upath(), asUtf16(message)); },
-                  [&](ChangeModel &model) { return model.commit(message); });
+    const auto byLibrary = [&](CMAdapter &adapter)
+    {
+        try
+        {
+            adapter.commit(upath(), asUtf16(message));
+        }
+        catch (const git::LibGit2Exception &exception)
+        {
+            // A merge of which nothing was kept: that is meant here, and git does it.
+            const std::string text = asUtf8(exception.getError().getMessage());
+            if (text.find("run: git commit") == std::string::npos)
+                throw;
+            ChangeModel(library_.repository()).commit(message);
+        }
+    };
+    return change(byLibrary, [&](ChangeModel &model) { return model.commit(message); });
 }
 
 void Twins::branch(const std::string &name, const std::vector<PlannedFile> &files)
@@ -147,6 +161,86 @@ bool Twins::merge(const std::string &branch)
     return result.succeeded();
 }
 
+std::string Twins::switchTo(const std::string &branch)
+{
+    note("switchBranch", {branch});
+    return tryChange([&branch](git::BranchManager &branches) { branches.switchBranch(branch); },
+                     {"switch", "--quiet", branch});
+}
+
+std::string Twins::mergeByLibrary(const std::string &branch)
+{
+    note("merge", {branch});
+    return tryChange([&branch](git::BranchManager &branches) { branches.merge(branch); },
+                     {"merge", "--quiet", "--no-edit", branch});
+}
+
+std::string Twins::tryChange(const std::function<void(git::BranchManager &branches)> &byLibrary,
+                             const std::vector<std::string> &byGit)
+{
+    const fs::path &copy = library_.repository().path();
+    const Snapshot before = takeSnapshot(copy, copy);
+    const auto kept = worthKeeping(before);
+    std::string raised;
+    try
+    {
+        byLibrary(*git::BranchManager::create(*adapter_));
+    }
+    catch (const git::GitException &exception)
+    {
+        raised = asUtf8(exception.GetUnicodeMessageTxt());
+    }
+    const Snapshot after = takeSnapshot(copy, copy);
+    for (const auto &id : lostOf(kept, after, copy))
+        ADD_FAILURE() << id << " is lost\n" << differenceOf(before, after);
+    const bool isRefused = !raised.empty() && !isMerging();
+    if (isRefused)
+    {
+        EXPECT_EQ(changeOf(before, after), "") << "refused with " << raised;
+    }
+    const bool isRefusedByGit = !git_.repository().tryGit(byGit).succeeded();
+    const bool isAlike = areAlike();
+    if (!isAlike)
+        adopt();
+    compare();
+    const std::string outcome = isRefused ? "refused" : "done";
+    return outcome + (isAlike ? "" : isRefusedByGit ? ", by git refused" : ", by git otherwise");
+}
+
+std::set<std::string> Twins::worthKeeping(const Snapshot &before)
+{
+    const GitReport &known = report();
+    std::set<std::string> ids = before.indexIds;
+    for (const auto &[name, id] : before.fileIds)
+        if (known.count(name) == 1)
+            ids.insert(id);
+    return ids;
+}
+
+bool Twins::areAlike()
+{
+    const auto look = [](const Twin &twin)
+    {
+        Snapshot snapshot = takeSnapshot(twin.repository().path(), twin.repository().path());
+        // Ids differ by the time of their making.
+        snapshot.history.clear();
+        return snapshot;
+    };
+    const std::string &head = ".git/HEAD";
+    return differenceOf(look(library_), look(git_)).empty() &&
+           library_.repository().read(head) == git_.repository().read(head) &&
+           describeHead(library_, headFile()) == describeHead(git_, headFile());
+}
+
+void Twins::adopt()
+{
+    describeHead(library_, headFile());
+    fs::remove_all(git_.repository().path());
+    fs::copy(library_.repository().path(), git_.repository().path(),
+             fs::copy_options::recursive | fs::copy_options::copy_symlinks);
+    git_.commits = library_.commits;
+}
+
 std::string Twins::change(const std::function<void(CMAdapter &adapter)> &byLibrary,
                           const std::function<std::string(ChangeModel &model)> &byGit)
 {
@@ -169,7 +263,7 @@ const GitReport &Twins::report()
 
 bool Twins::hasCommit() const
 {
-    return fs::exists(library_.repository() / mainBranch);
+    return fs::exists(library_.repository() / headFile());
 }
 
 bool Twins::isMerging() const
@@ -190,7 +284,8 @@ void Twins::compare()
     EXPECT_EQ(listIndex(library_.repository()), model_.index());
     EXPECT_EQ(runGitStatus(library_.repository()), model_.status());
     EXPECT_EQ(workingTreeOf(library_.repository()), workingTreeOf(git_.repository()));
-    EXPECT_EQ(describeHead(library_, mainBranch), describeHead(git_, mainBranch));
+    EXPECT_EQ(library_.repository().read(".git/HEAD"), git_.repository().read(".git/HEAD"));
+    EXPECT_EQ(describeHead(library_, headFile()), describeHead(git_, headFile()));
     for (const auto *name : {".git/MERGE_HEAD", ".git/MERGE_MSG", ".git/index.lock"})
     {
         EXPECT_EQ(fs::exists(library_.repository() / name), fs::exists(git_.repository() / name))
@@ -203,6 +298,12 @@ void Twins::compare()
         states.emplace(asBytes(path).substr(root), state.getState());
     }
     EXPECT_EQ(states, model_.states());
+}
+
+std::string Twins::headFile() const
+{
+    const std::string head = library_.repository().read(".git/HEAD");
+    return ".git/" + head.substr(5, head.size() - 6);
 }
 
 /// The commit that a branch names: tree, parents, author and message, as far as both can agree. The

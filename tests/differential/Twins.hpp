@@ -5,12 +5,15 @@
 #include <functional>
 #include <map>
 #include <memory>
+#include <set>
 #include <string>
 #include <vector>
 
 #include "ChangeModel.hpp"
+#include "Snapshot.hpp"
 #include "WorkingCopyMaker.hpp"
 #include "vclink/CMAdapter.hpp"
+#include "vclink/git/BranchManager.hpp"
 
 namespace vclink::test
 {
@@ -34,6 +37,13 @@ class Twins
     std::string revert(const Names &names);
     std::string markResolved(const std::string &name);
     std::string commit(const std::string &message);
+
+    /// Each lets the library do it, and fails the running test if anything is lost of what the user
+    /// has in the working tree or the index, or if a refusal has changed anything. Where git does
+    /// something else, its working copy becomes like the library's.
+    /// @return "refused", "as git", or "not as git"
+    std::string switchTo(const std::string &branch);
+    std::string mergeByLibrary(const std::string &branch);
 
     /// Makes a branch whose one commit follows HEAD, with these files; a file without a mode is
     /// deleted.
@@ -78,7 +88,16 @@ class Twins
     /// Does the same with both, and compares the refusals and the working copies.
     std::string change(const std::function<void(CMAdapter &adapter)> &byLibrary,
                        const std::function<std::string(ChangeModel &model)> &byGit);
+    /// The same of a change that may be refused.
+    std::string tryChange(const std::function<void(git::BranchManager &branches)> &byLibrary,
+                          const std::vector<std::string> &byGit);
+    /// What the library must not lose, by id.
+    std::set<std::string> worthKeeping(const Snapshot &before);
+    bool areAlike();
+    void adopt();
     void compare();
+    /// The file of the branch that both are on.
+    std::string headFile() const;
     static std::string describeHead(Twin &twin, const std::string &reference);
     std::string outcomeOf(const std::function<void()> &action) const;
     upath inRoot(const std::string &name) const;
