@@ -80,7 +80,8 @@ void ChangeSequence::change()
     {
         return remove();
     }
-    if (kind < 41)
+    // Reverts meet conflicts only as long as a merge goes on.
+    if (kind < 41 || (kind >= 80 && twins_.isMerging()))
     {
         return revert();
     }
@@ -112,7 +113,7 @@ void ChangeSequence::add()
 
 void ChangeSequence::remove()
 {
-    const bool deletedOnly = random_.chance(15);
+    const bool deletedOnly = random_.chance(25);
     const Names names =
         listable([deletedOnly](const GitFile &file) { return !deletedOnly || file.index == 'D'; });
     count("remove", twins_.remove(pickSome(names, 4)));
