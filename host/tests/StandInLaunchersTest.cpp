@@ -46,8 +46,12 @@ class StandInLaunchers : public testing::Test
     /// Runs a launcher with files of the folder as its arguments.
     template <class... Names> Result run(const std::string &path, const Names &...names) const
     {
+        return runWith(path, folder_.file(names)...);
+    }
+    template <class... Words> static Result runWith(const std::string &path, const Words &...words)
+    {
         std::string command = quoted(path);
-        ((command += ' ' + quoted(folder_.file(names))), ...);
+        ((command += ' ' + quoted(words)), ...);
         Result result;
         std::FILE *const output = ::popen((command + " 2>&1 </dev/null").c_str(), "r");
         std::array<char, 4096> block{};
@@ -161,6 +165,45 @@ TEST_F(StandInLaunchers, ShowNothingOfEqualFiles)
     const Result result = run(launcher("vkDiff"), "base", "ours");
     EXPECT_EQ(result.status, 0);
     EXPECT_EQ(result.output, "");
+}
+
+/// As the settings of the tools have it.
+TEST_F(StandInLaunchers, TakeAWorkingFolderFromBeforeAnAbsoluteName)
+{
+    writeSides("ours\n2\n3\n4\n5\n", "1\n2\n3\n4\ntheirs\n");
+    const std::string before = std::filesystem::current_path().string() + '/';
+    const Result merged =
+        runWith(launcher("vkMerge"), before + folder_.file("base"), before + folder_.file("ours"),
+                before + folder_.file("theirs"), before + folder_.file("a new file"));
+    EXPECT_EQ(merged.status, 0) << merged.output;
+    EXPECT_EQ(read("a new file"), clean);
+    const Result different =
+        runWith(launcher("vkDiff"), folder_.file("base"), before + folder_.file("ours"));
+    EXPECT_EQ(different.status, 0) << different.output;
+    EXPECT_NE(different.output.find("+++ " + folder_.file("ours") + '\n'), std::string::npos);
+    EXPECT_EQ(runWith(launcher("vkDiff"), folder_.file("base"), before + "/dev/null").status, 0);
+}
+
+TEST_F(StandInLaunchers, LeaveOtherDoubleSlashesInNames)
+{
+    writeSides("ours\n", "");
+    std::filesystem::create_directory(folder_.file("in"));
+    writeFile(folder_.file("in/file"), "1\n");
+    EXPECT_NE(run(launcher("vkDiff"), "base", "in//file").output.find("in//file\n"),
+              std::string::npos);
+}
+
+TEST_F(StandInLaunchers, ShowWhatIsDifferentInFolders)
+{
+    for (const std::string name : {"left", "right"})
+        std::filesystem::create_directory(folder_.file(name));
+    writeFile(folder_.file("left/a file"), "1\n");
+    writeFile(folder_.file("right/a file"), "2\n");
+    writeFile(folder_.file("right/new"), "new\n");
+    const Result result = run(launcher("vkDiff"), "left", "right");
+    EXPECT_EQ(result.status, 0);
+    EXPECT_NE(result.output.find("\n-1\n+2\n"), std::string::npos) << result.output;
+    EXPECT_NE(result.output.find("\n+new\n"), std::string::npos) << result.output;
 }
 
 TEST_F(StandInLaunchers, WantTheirNumberOfArguments)

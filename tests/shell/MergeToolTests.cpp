@@ -106,5 +106,66 @@ TEST_F(ShellMergeTool, ServesGitsMergeToolAndDiffTool)
         HasSubstr("\n-1\n+ours\n"));
 }
 
+/// The tools as git calls them, for files whose names have blanks.
+class ShellGitTools : public ShellMergeTool
+{
+  protected:
+    ShellGitTools()
+    {
+        commitFiles({{name, begin}, {".gitattributes", "*.txt merge=binary\n"}});
+    }
+    /// What git difftool shows of a line that was "1".
+    std::string difference(std::vector<std::string> arguments) const
+    {
+        const std::vector<std::string> command{"difftool", "--no-prompt", "--trust-exit-code",
+                                               "--tool=vkDiff"};
+        arguments.insert(arguments.begin(), command.begin(), command.end());
+        return repository_.git(arguments);
+    }
+
+    const std::string name = "a folder/with a file.txt";
+};
+
+TEST_F(ShellGitTools, CompareTwoCommits)
+{
+    commitFiles({{name, ours}, {"a new one", "new\n"}});
+    repository_.remove("b");
+    repository_.commitAll("b is gone");
+    EXPECT_THAT(difference({"HEAD~2", "HEAD"}),
+                testing::AllOf(HasSubstr("\n-1\n+ours\n"), HasSubstr("--- /dev/null\n"),
+                               HasSubstr("\n+new\n"), HasSubstr("+++ /dev/null\n")));
+}
+
+TEST_F(ShellGitTools, CompareACommitWithTheWorkingCopy)
+{
+    repository_.write(name, ours);
+    EXPECT_THAT(difference({}), HasSubstr("\n-1\n+ours\n"));
+    EXPECT_THAT(difference({"HEAD", "--", name}), HasSubstr("\n-1\n+ours\n"));
+}
+
+TEST_F(ShellGitTools, CompareFolders)
+{
+    commitFiles({{name, ours}, {"a new one", "new\n"}});
+    const std::string two = difference({"--dir-diff", "HEAD~1", "HEAD"});
+    EXPECT_THAT(two, testing::AllOf(HasSubstr("\n-1\n+ours\n"), HasSubstr("\n+new\n")));
+    repository_.write(name, theirs);
+    EXPECT_THAT(difference({"--dir-diff"}), HasSubstr("\n+theirs\n"));
+}
+
+TEST_F(ShellGitTools, Merge)
+{
+    for (const std::string setting : {"false", "true"})
+    {
+        repository_.git({"config", "mergetool.writeToTemp", setting});
+        makeBranch("other", {{name, theirs}});
+        commitFiles({{name, ours}});
+        fail({"merge", "other"});
+        repository_.git({"mergetool", "--no-prompt", "--tool=vkMerge", name});
+        EXPECT_EQ(repository_.read(name), both);
+        repository_.git({"reset", "--quiet", "--hard", "HEAD~1"});
+        repository_.git({"branch", "--quiet", "-D", "other"});
+    }
+}
+
 } // namespace
 } // namespace vclink::test
