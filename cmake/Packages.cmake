@@ -52,12 +52,33 @@ macro(vclink_package component name section summary)
         COMPONENT ${component})
 endmacro()
 
+# The first packages of libgit2 with the fixes that docs/linking.md lists. What is read from the files
+# would also be satisfied by older ones.
+set(safe_libgit2_1.5 "1.5.1+ds-1+deb12u2")
+set(safe_libgit2_1.8 "1.8.7")
+set(safe_libgit2_1.9 "1.9.7")
+string(REGEX MATCH "^[0-9]+\\.[0-9]+" libgit2_series "${libgit2_VERSION}")
+set(safe_libgit2 "")
+if(DEFINED safe_libgit2_${libgit2_series})
+    set(safe_libgit2 "libgit2-${libgit2_series} (>= ${safe_libgit2_${libgit2_series}})")
+endif()
+set(VCLINK_LIBGIT2_PACKAGE "${safe_libgit2}"
+    CACHE STRING "libgit2, as the library's Debian package depends on it")
+if(NOT VCLINK_LIBGIT2_PACKAGE)
+    message(WARNING "No release of libgit2 ${libgit2_series} has all known fixes: set "
+        "VCLINK_LIBGIT2_PACKAGE to a package that has them")
+endif()
+
 set(runtime libvclink-git${PROJECT_VERSION_MAJOR})
 set(host_runtime libvclink-host${PROJECT_VERSION_MAJOR})
+set(runtime_depends "${host_runtime} (>= ${PROJECT_VERSION})")
+if(VCLINK_LIBGIT2_PACKAGE)
+    string(APPEND runtime_depends ", ${VCLINK_LIBGIT2_PACKAGE}")
+endif()
 vclink_package(runtime ${runtime} libs
     "Git back end of a desktop application
  The shared library that answers the application's source-control interfaces."
-    DEPENDS "${host_runtime} (>= ${PROJECT_VERSION})")
+    DEPENDS "${runtime_depends}")
 vclink_package(development libvclink-git-dev libdevel
     "Git back end of a desktop application, for developers
  Headers, and what finds the library from CMake and from pkg-config."

@@ -101,6 +101,19 @@ TEST_F(DebianPackages, OfTheLibraryDependsOnWhatItIsLinkedWith)
     EXPECT_THAT(depends, AllOf(Not(HasSubstr("locale")), Not(HasSubstr("-dev"))));
 }
 
+TEST_F(DebianPackages, OfTheLibraryWantsALibgit2WithTheKnownFixes)
+{
+    const std::string depends = field(library, "Depends");
+    const std::string package = VCLINK_LIBGIT2_PACKAGE;
+    ASSERT_THAT(package, testing::MatchesRegex("libgit2-[0-9.]+ \\(>= [^)]+\\)"));
+    EXPECT_THAT(depends, HasSubstr(package));
+    // The table that people read says the same.
+    std::ifstream file(VCLINK_SOURCE_FOLDER "/docs/linking.md");
+    const std::string document(std::istreambuf_iterator<char>(file), {});
+    const std::string version = package.substr(package.find(">= ") + 3);
+    EXPECT_THAT(document, HasSubstr(version.substr(0, version.size() - 1)));
+}
+
 TEST_F(DebianPackages, OfTheStandInKnowsNothingOfTheLibrary)
 {
     EXPECT_THAT(field(host, "Depends"), Not(HasSubstr("vclink")));
