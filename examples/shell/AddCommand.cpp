@@ -10,6 +10,7 @@
 #include "links.hpp"
 #include "namedPaths.hpp"
 #include "refusals.hpp"
+#include "runStoppable.hpp"
 #include "states.hpp"
 
 namespace vclink::shell
@@ -51,7 +52,11 @@ class AddCommand : public Command
         const std::vector<upath> list = addressable(filterFollowed(files, root, false), root);
         refuseStrays("Nothing was added", adapter, paths, list,
                      [](FileState::State) { return true; });
-        adapter.addFiles(list);
+        const ExitStatus status = runStoppable(session, [&] { adapter.addFiles(list); });
+        if (status != Done)
+        {
+            return status;
+        }
         const FileStateMap leftOut = findLeftOut(adapter, files, isNew);
         remark(files.empty() ? "There is no new file to add."
                              : "Added " + countFiles(files.size() - leftOut.size()) + '.');

@@ -7,6 +7,7 @@
 #include "Session.hpp"
 #include "arguments.hpp"
 #include "commands.hpp"
+#include "runStoppable.hpp"
 #include "vclink/git/BranchManager.hpp"
 
 namespace vclink::shell
@@ -33,18 +34,27 @@ class BranchCommand : public Command
     {
         const auto manager = git::BranchManager::create(session.adapter());
         const std::string name = name_->results().front();
-        if (deletes_)
+        const ExitStatus status = runStoppable(session, [&] { act(*manager, name); });
+        if (status == Done)
         {
-            manager->deleteBranch(name);
-            remark("Deleted the branch " + name + '.');
-            return Done;
+            remark((deletes_ ? "Deleted the branch " : "Made the branch ") + name + '.');
         }
-        manager->createBranch(git::BranchParameters(name, start_->results().front()));
-        remark("Made the branch " + name + '.');
-        return Done;
+        return status;
     }
 
   private:
+    void act(git::BranchManager &manager, const std::string &name) const
+    {
+        if (deletes_)
+        {
+            manager.deleteBranch(name);
+        }
+        else
+        {
+            manager.createBranch(git::BranchParameters(name, start_->results().front()));
+        }
+    }
+
     void checkStart() const
     {
         if (deletes_ && !start_->empty())

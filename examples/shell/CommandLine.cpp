@@ -118,8 +118,9 @@ CommandLine::CommandLine()
 {
     setWords(*line_->get_formatter());
     line_->set_help_flag("-h,--help", "Show this help");
-    line_->footer("vclink-shell COMMAND --help tells more of a command.\n\n"
-                  "Exit status: 0 done, 1 failed, 2 wrong usage, 130 cancelled.");
+    line_->footer(
+        "vclink-shell COMMAND --help tells more of a command.\n\n"
+        "Exit status: 0 done, 1 failed, 2 wrong usage, 128 and a signal's number stopped.");
     // A file may have the name of a command: only the first word is one.
     line_->require_subcommand(0, 1);
     declareSettings();
@@ -176,6 +177,10 @@ void CommandLine::declareSettings()
             "Draw the progress of long operations on standard error: always,\nnever, or auto "
             "(if that is a terminal)")
         ->type_name("WHEN");
+    line_->add_flag(
+        "--bare", settings_.takesAnyBare,
+        "Also work in a bare repository inside a working copy, whose\nconfiguration may "
+        "have come with a clone");
 }
 
 void CommandLine::declareCommands()

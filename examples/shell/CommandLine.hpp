@@ -31,6 +31,8 @@ struct Settings
     std::optional<unsigned> severities;
     std::optional<std::string> locale;
     Progress progress = Progress::WhereSeen;
+    /// whether to work in a bare repository inside a working copy, too
+    bool takesAnyBare = false;
 };
 
 /// Reads the arguments of the program.

@@ -11,8 +11,10 @@
 #include "fl/i18n/convert.hpp"
 #include "namedPaths.hpp"
 #include "refusals.hpp"
+#include "runStoppable.hpp"
 #include "states.hpp"
 #include "unfinished.hpp"
+#include "workingCopy.hpp"
 
 namespace vclink::shell
 {
@@ -60,17 +62,24 @@ class CommitCommand : public Command
     {
         CMAdapter &adapter = session.adapter();
         const upath &root = adapter.getRootFolder();
-        const FileStateMap states = adapter.getFolderStates(root);
+        const FileStateMap states =
+            takesAll_ ? adapter.getFolderStates(root) : wholeStates(adapter);
         if (!takesAll_)
         {
             refuseHalfWay(adapter);
             refuseConflicts(states, root);
         }
-        adapter.commit(root, fl::i18n::utf8_to_ustring(message_->results().front()));
+        const ustring message = fl::i18n::utf8_to_ustring(message_->results().front());
+        const ExitStatus status = runStoppable(session, [&] { adapter.commit(root, message); });
+        if (status != Done)
+        {
+            return status;
+        }
         // What a sparse checkout leaves out is missing before and after.
         const FileStateMap changed = filter(states, isChanged);
         const std::size_t left = findLeftOut(adapter, changed, isChanged).size();
-        remark("Committed " + countFiles(changed.size() - left) + '.');
+        remark(states.empty() ? "Committed."
+                              : "Committed " + countFiles(changed.size() - left) + '.');
         return Done;
     }
 

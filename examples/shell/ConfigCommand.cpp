@@ -10,6 +10,7 @@
 #include "commands.hpp"
 #include "fl/i18n/convert.hpp"
 #include "names.hpp"
+#include "runStoppable.hpp"
 #include "vclink/git/GitConfig.hpp"
 
 namespace vclink::shell
@@ -37,15 +38,14 @@ class ConfigCommand : public Command
     ExitStatus run(Session &session) override
     {
         git::GitConfig config;
-        if (writes_)
-        {
-            config.writeAutoMergeDriver();
-            config.writeMergeTool();
-            config.writeDiffTool();
-        }
-        else
+        if (!writes_)
         {
             show(config, session.output());
+        }
+        else if (const ExitStatus status = runStoppable(session, [&config] { write(config); });
+                 status != Done)
+        {
+            return status;
         }
         const std::optional<upath> file = config.globalFilePath();
         remark(file ? "Git's configuration of this user: " + nativePath(*file).string()
@@ -54,6 +54,13 @@ class ConfigCommand : public Command
     }
 
   private:
+    static void write(git::GitConfig &config)
+    {
+        config.writeAutoMergeDriver();
+        config.writeMergeTool();
+        config.writeDiffTool();
+    }
+
     static void show(const git::GitConfig &config, Output &output)
     {
         for (const auto &[key, value] :

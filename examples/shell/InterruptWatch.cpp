@@ -21,25 +21,28 @@ constexpr std::chrono::seconds patience{3};
 std::atomic<int> handlersPipe{-1};
 static_assert(std::atomic<int>::is_always_lock_free);
 
-extern "C" void handOver(int /*signal*/)
+extern "C" void handOver(int signal)
 {
     const int error = errno;
-    const char word = 'i';
+    const char word = static_cast<char>(signal);
     // A pipe that is full has been told often enough.
     static_cast<void>(::write(handlersPipe.load(), &word, sizeof word) == 1);
     errno = error;
 }
 
-/// Keeps the signal from threads that are started meanwhile.
+/// Keeps the signals from threads that are started meanwhile.
 class HeldBack
 {
   public:
-    HeldBack()
+    template <class Signals> explicit HeldBack(const Signals &signals)
     {
-        sigset_t interrupt;
-        ::sigemptyset(&interrupt);
-        ::sigaddset(&interrupt, SIGINT);
-        ::pthread_sigmask(SIG_BLOCK, &interrupt, &previous_);
+        sigset_t set;
+        ::sigemptyset(&set);
+        for (const int signal : signals)
+        {
+            ::sigaddset(&set, signal);
+        }
+        ::pthread_sigmask(SIG_BLOCK, &set, &previous_);
     }
     HeldBack(const HeldBack &) = delete;
     HeldBack &operator=(const HeldBack &) = delete;
@@ -58,39 +61,62 @@ InterruptWatch::InterruptWatch(Terminator &terminator, Activity &activity,
                                std::function<void(const std::string &)> tellGivenUp)
     : terminator_(terminator), activity_(activity), tellGivenUp_(std::move(tellGivenUp))
 {
-    ::sigaction(SIGINT, nullptr, &previous_);
-    if (previous_.sa_handler == SIG_IGN)
+    for (std::size_t index = 0; index < signals.size(); ++index)
     {
-        return;
+        ::sigaction(signals[index], nullptr, &previous_[index]);
     }
     {
-        const HeldBack heldBack;
+        const HeldBack heldBack(signals);
         listener_ = std::thread([this] { listen(); });
     }
     handlersPipe.store(pipe_.writeEnd());
-    struct sigaction action = {};
-    action.sa_handler = handOver;
-    action.sa_flags = SA_RESTART;
-    ::sigemptyset(&action.sa_mask);
-    ::sigaction(SIGINT, &action, nullptr);
+    struct sigaction handing = {};
+    handing.sa_handler = handOver;
+    handing.sa_flags = SA_RESTART;
+    ::sigemptyset(&handing.sa_mask);
+    take(handing);
 }
 
 InterruptWatch::~InterruptWatch()
+{
+    end();
+}
+
+void InterruptWatch::end() noexcept
 {
     if (!listener_.joinable())
     {
         return;
     }
-    ::sigaction(SIGINT, &previous_, nullptr);
+    restore();
     pipe_.closeWriteEnd();
     listener_.join();
-    // What was still in the pipe may have made the listener restore the default.
-    ::sigaction(SIGINT, &previous_, nullptr);
+    // What was still in the pipe may have made the listener restore the defaults.
+    restore();
 }
 
-bool InterruptWatch::wasAsked() const noexcept
+int InterruptWatch::askedBy() const noexcept
 {
-    return asked_.load();
+    return askedBy_.load();
+}
+
+void InterruptWatch::take(const struct sigaction &action) noexcept
+{
+    for (std::size_t index = 0; index < signals.size(); ++index)
+    {
+        if (previous_[index].sa_handler != SIG_IGN)
+        {
+            ::sigaction(signals[index], &action, nullptr);
+        }
+    }
+}
+
+void InterruptWatch::restore() noexcept
+{
+    for (std::size_t index = 0; index < signals.size(); ++index)
+    {
+        ::sigaction(signals[index], &previous_[index], nullptr);
+    }
 }
 
 void InterruptWatch::listen()
@@ -101,7 +127,7 @@ void InterruptWatch::listen()
         count = ::read(pipe_.readEnd(), &word, sizeof word);
         if (count == 1)
         {
-            answer();
+            answer(word);
         }
         else if (count < 0 && errno != EINTR)
         {
@@ -110,9 +136,14 @@ void InterruptWatch::listen()
     }
 }
 
-void InterruptWatch::answer()
+void InterruptWatch::answer(int signal)
 {
-    if (!asked_.exchange(true))
+    const bool isFirst = askedBy_.load() == 0;
+    if (isFirst || signal != SIGINT)
+    {
+        askedBy_.store(signal);
+    }
+    if (isFirst)
     {
         // The three seconds begin here at the earliest.
         activity_.note();
@@ -139,7 +170,9 @@ void InterruptWatch::ask()
 
 void InterruptWatch::giveUp(const std::string &reason)
 {
-    ::signal(SIGINT, SIG_DFL);
+    struct sigaction byDefault = {};
+    byDefault.sa_handler = SIG_DFL;
+    take(byDefault);
     tellGivenUp_(reason);
 }
 

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include <array>
 #include <atomic>
 #include <csignal>
 #include <functional>
@@ -14,43 +15,52 @@
 namespace vclink::shell
 {
 
-/// While it lives, Ctrl-C asks the back end to stop in place of ending the process: the first one
-/// asks on the terminator. Later ones change nothing as long as the back end is heard of. When it
-/// has not been for three seconds, or could not be asked, one restores what Ctrl-C does by default,
-/// so that the next one ends the process. Where Ctrl-C was ignored before, it stays ignored.
+/// While it lives, SIGINT (Ctrl-C), SIGTERM and SIGHUP ask the back end to stop instead of ending
+/// the process: the first one asks on the terminator. Later ones change nothing as long as the back
+/// end reports something. If it has not for three seconds, or could not be asked, one restores the
+/// defaults, so that the next one ends the process. A signal that was ignored before stays ignored.
 ///
-/// The signal's handler only writes to a pipe; a thread of its own reads it and asks. No signal is
+/// The signals' handler only writes to a pipe; a thread of its own reads it and asks. No signal is
 /// blocked on the thread that works, so that programs started there inherit no blocked signal.
 /// At most one object at a time.
 class InterruptWatch
 {
   public:
     /// @param terminator, activity outlive the watch
-    /// @param tellGivenUp called on the watch's own thread when the default was restored, with the
+    /// @param tellGivenUp called on the watch's own thread when the defaults were restored, with
+    /// the
     ///        reason, which is a sentence; it must not throw
     /// @throws std::system_error when the pipe or the thread can't be had
     InterruptWatch(Terminator &terminator, Activity &activity,
                    std::function<void(const std::string &)> tellGivenUp);
     InterruptWatch(const InterruptWatch &) = delete;
     InterruptWatch &operator=(const InterruptWatch &) = delete;
-    /// Restores what Ctrl-C did before.
+    /// As end().
     ~InterruptWatch();
 
-    /// Whether the person asked to stop.
-    bool wasAsked() const noexcept;
+    /// Answers what has come, and restores what the signals did before. askedBy() is final then.
+    void end() noexcept;
+    /// The signal that asked to stop, or 0. Of several, the last one that is not Ctrl-C: whoever
+    /// sent it expects the process to end.
+    int askedBy() const noexcept;
 
   private:
+    static constexpr std::array<int, 3> signals{SIGINT, SIGTERM, SIGHUP};
+
+    /// Lets the signals that were not ignored do this.
+    void take(const struct sigaction &action) noexcept;
+    void restore() noexcept;
     void listen();
-    void answer();
+    void answer(int signal);
     void ask();
     void giveUp(const std::string &reason);
 
     Terminator &terminator_;
     Activity &activity_;
     std::function<void(const std::string &)> tellGivenUp_;
-    std::atomic<bool> asked_{false};
+    std::atomic<int> askedBy_{0};
     Pipe pipe_;
-    struct sigaction previous_ = {};
+    std::array<struct sigaction, signals.size()> previous_{};
     std::thread listener_;
 };
 

@@ -5,36 +5,38 @@
 
 #include <CLI/CLI.hpp>
 
+#include "MergeLog.hpp"
 #include "Output.hpp"
 #include "ProgressLine.hpp"
 #include "Session.hpp"
 #include "arguments.hpp"
 #include "commands.hpp"
 #include "failures.hpp"
+#include "mergeLeftovers.hpp"
 #include "namedPaths.hpp"
 #include "revisions.hpp"
 #include "runStoppable.hpp"
 #include "states.hpp"
+#include "unfinished.hpp"
+#include "workingCopy.hpp"
 
 namespace vclink::shell
 {
 namespace
 {
 
-// Some seconds' worth.
-constexpr std::size_t historyLimit = 10'000;
-
 bool isInOrder(const git::BranchManager &manager)
 {
     return manager.getRepositoryState() == "Normal";
 }
 
-/// Whether a merge may put such a file back, or is refused for it. Unknown is also what a link is
-/// that has taken a file's place.
-bool isPutBack(FileState::State state)
+void tellIfAny(const std::string &begin, const FileStateMap &files, const upath &root,
+               const std::string &end)
 {
-    return state == FileState::Modified || state == FileState::Missing ||
-           state == FileState::Unknown;
+    if (!files.empty())
+    {
+        complain(begin + listNames(files, root) + end);
+    }
 }
 
 class MergeCommand : public Command
@@ -45,9 +47,6 @@ class MergeCommand : public Command
         name_ = declareName(line, "NAME",
                             "A branch, or any revision of a commit, e.g. v1^{commit} for a tag")
                     ->required();
-        line.add_flag("--force", loses_,
-                      "Merge beside modified and missing files: missing ones come back, and the\n"
-                      "merge is refused if it would lose changes");
         line.footer("Brings the changes of another branch into the current one. Tells what came of "
                     "it: \"Already up to\n"
                     "date.\", a fast-forward, or a merge commit. Files that are given to a merge "
@@ -55,7 +54,9 @@ class MergeCommand : public Command
                     "\"merge\" are merged by it; see config for the tool that comes along.\n\n"
                     "After conflicts the files in conflict are named, and the status is 1. Make "
                     "each as it should be,\n"
-                    "mark it with resolved, and conclude the merge with commit.\n\n"
+                    "mark it with resolved, and conclude the merge with commit. A merge that would "
+                    "lose uncommitted\n"
+                    "changes or untracked files is refused, and changes nothing.\n\n"
                     "Ctrl-C stops it, as long as it still looks for what is to be written: nothing "
                     "has changed then.");
     }
@@ -67,46 +68,31 @@ class MergeCommand : public Command
         const std::optional<std::string> before = findRevision(*manager, "HEAD");
         const std::optional<std::string> theirs = findRevision(*manager, name);
         const bool wasInOrder = isInOrder(*manager);
-        // What can't be merged at all is told by the back end.
-        if (before && theirs && wasInOrder && !loses_)
-        {
-            refuseChanges(session.adapter(), *manager, *theirs);
-        }
-        const ExitStatus status = merge(session, *manager, name);
+        MergeNotes notes;
+        const ExitStatus status = merge(session, *manager, name, notes);
         if (status == Done)
         {
             tellResult(session.output(), before, theirs, manager->getHeadRevision());
         }
-        else if (wasInOrder && !isInOrder(*manager))
+        else if (!wasInOrder)
         {
-            tellWayOn(session.adapter());
+            tellUnfinished(session.adapter());
+        }
+        else if (!isInOrder(*manager))
+        {
+            tellWayOn(session.adapter(), notes);
         }
         return status;
     }
 
   private:
-    /// @throws ShellFailure when there are changes that a merge could throw away
-    static void refuseChanges(CMAdapter &adapter, const git::BranchManager &manager,
-                              const std::string &theirs)
-    {
-        const upath &root = adapter.getRootFolder();
-        const FileStateMap changed = filter(adapter.getFolderStates(root), isPutBack);
-        if (!changed.empty() && !isInHistory(manager, theirs, historyLimit))
-        {
-            throw ShellFailure(
-                "Nothing was merged. These files are changed, and a merge could put them back as "
-                "they are in\nthe last commit, or be refused:" +
-                listNames(changed, root) +
-                "\nCommit the changes first, or throw them away with \"vclink-shell revert\". With "
-                "--force the merge\nis tried beside them.");
-        }
-    }
-
-    /// Tells of a failure.
-    static ExitStatus merge(Session &session, git::BranchManager &manager, const std::string &name)
+    /// Reports a failure.
+    static ExitStatus merge(Session &session, git::BranchManager &manager, const std::string &name,
+                            MergeNotes &notes)
     {
         try
         {
+            const MergeLog log(notes);
             return runStoppable(session, [&manager, &name] { manager.merge(name); });
         }
         catch (...)
@@ -134,23 +120,40 @@ class MergeCommand : public Command
         output.flush();
     }
 
+    /// How to finish what was under way before.
+    static void tellUnfinished(CMAdapter &adapter)
+    {
+        const std::string text = describeUnfinishedMerge(adapter);
+        if (!text.empty())
+        {
+            complain(text);
+        }
+    }
+
     /// What has to be done after a merge that stopped half-way.
-    static void tellWayOn(CMAdapter &adapter)
+    static void tellWayOn(CMAdapter &adapter, const MergeNotes &notes)
     {
         const upath &root = adapter.getRootFolder();
-        const FileStateMap conflicts = filter(adapter.getFolderStates(root), isInConflict);
+        const FileStateMap states = wholeStates(adapter);
+        const FileStateMap conflicts = filter(states, isInConflict);
         if (conflicts.empty())
         {
             complain("No file is in conflict. Conclude the merge with \"vclink-shell commit\".");
             return;
         }
-        complain("These files are in conflict:" + listNames(conflicts, root) +
-                 "\nMake each as it should be, and mark it with \"vclink-shell resolved\". Then "
-                 "conclude the merge\nwith \"vclink-shell commit\".");
+        tellIfAny("These files are in conflict:", conflicts, root,
+                  "\nMake each as it should be, and mark it with \"vclink-shell resolved\". Then "
+                  "conclude the merge\nwith \"vclink-shell commit\".");
+        tellIfAny("A merge command refused these files. They may be a mix of both sides without "
+                  "conflict markers:",
+                  findRefused(adapter, conflicts, notes), root, "");
+        tellIfAny("These files have another name now, because something else has theirs:",
+                  findSetAside(states), root,
+                  "\nThe merge leaves them out: move what you want to keep to its place, and add "
+                  "it.");
     }
 
     const CLI::Option *name_ = nullptr;
-    bool loses_ = false;
 };
 
 } // namespace

@@ -4,15 +4,7 @@
 #include <charconv>
 #include <string_view>
 
-#include <boost/log/attributes/value_extraction.hpp>
-#include <boost/log/core.hpp>
-#include <boost/log/sinks/basic_sink_backend.hpp>
-#include <boost/log/sinks/sync_frontend.hpp>
-#include <boost/make_shared.hpp>
-
-#include "libraryRecords.hpp"
 #include "severities.hpp"
-#include "vclink_host/logging.hpp"
 
 namespace vclink::shell
 {
@@ -50,41 +42,6 @@ void noteCredentials(RemoteNotes &notes, std::string_view request)
 
 } // namespace
 
-class NotesBackend
-    : public boost::log::sinks::basic_sink_backend<boost::log::sinks::synchronized_feeding>
-{
-  public:
-    explicit NotesBackend(RemoteNotes &notes) : notes_(notes)
-    {
-    }
-
-    void consume(const boost::log::record_view &record)
-    {
-        if (const auto message = boost::log::extract<std::string>("Message", record))
-        {
-            takeNote(notes_, message.get());
-        }
-    }
-
-  private:
-    RemoteNotes &notes_;
-};
-
-using NotesSink = boost::log::sinks::synchronous_sink<NotesBackend>;
-
-namespace
-{
-
-boost::shared_ptr<NotesSink> makeNotesSink(RemoteNotes &notes)
-{
-    auto sink = boost::make_shared<NotesSink>(boost::make_shared<NotesBackend>(notes));
-    sink->set_filter([](const boost::log::attribute_value_set &values)
-                     { return isFromLibrary(values, parameterSeverity); });
-    return sink;
-}
-
-} // namespace
-
 void takeNote(RemoteNotes &notes, const std::string &record)
 {
     std::string_view text = record;
@@ -103,24 +60,9 @@ void takeNote(RemoteNotes &notes, const std::string &record)
     }
 }
 
-struct RemoteLog::Impl
-{
-    boost::shared_ptr<NotesSink> sink;
-    unsigned severitiesBefore;
-};
-
 RemoteLog::RemoteLog(RemoteNotes &notes)
-    : impl_(std::make_unique<Impl>(
-          Impl{makeNotesSink(notes), vclink_host::getEnabledSeverities(libraryLogger)}))
+    : reader_(parameterSeverity, [&notes](const std::string &record) { takeNote(notes, record); })
 {
-    boost::log::core::get()->add_sink(impl_->sink);
-    vclink_host::setEnabledSeverities(libraryLogger, impl_->severitiesBefore | parameterSeverity);
-}
-
-RemoteLog::~RemoteLog()
-{
-    vclink_host::setEnabledSeverities(libraryLogger, impl_->severitiesBefore);
-    boost::log::core::get()->remove_sink(impl_->sink);
 }
 
 } // namespace vclink::shell

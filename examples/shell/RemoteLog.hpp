@@ -1,10 +1,11 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
-#include <memory>
 #include <optional>
 #include <string>
 #include <vector>
+
+#include "RecordReader.hpp"
 
 namespace vclink::shell
 {
@@ -39,13 +40,9 @@ class RemoteLog
   public:
     /// @param notes outlives the object
     explicit RemoteLog(RemoteNotes &notes);
-    RemoteLog(const RemoteLog &) = delete;
-    RemoteLog &operator=(const RemoteLog &) = delete;
-    ~RemoteLog();
 
   private:
-    struct Impl;
-    std::unique_ptr<Impl> impl_;
+    RecordReader reader_;
 };
 
 } // namespace vclink::shell

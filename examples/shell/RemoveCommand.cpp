@@ -12,6 +12,7 @@
 #include "links.hpp"
 #include "namedPaths.hpp"
 #include "refusals.hpp"
+#include "runStoppable.hpp"
 #include "states.hpp"
 
 namespace vclink::shell
@@ -46,7 +47,11 @@ class RemoveCommand : public Command
                      [&root](const NamedPath &named) { return explain(root, named); });
         const Cover removed = cover(root, paths, isRemovable, LinkNames::None);
         refuseStrays("Nothing was removed", adapter, paths, removed.list, isRemovable);
-        adapter.removeFiles(removed.list);
+        const ExitStatus status = runStoppable(session, [&] { adapter.removeFiles(removed.list); });
+        if (status != Done)
+        {
+            return status;
+        }
         const FileStateMap leftOut = findLeftOut(adapter, removed.files, isRemovable);
         remark("Removed " + countFiles(removed.files.size() - leftOut.size()) +
                " from Git, not from the disk.");

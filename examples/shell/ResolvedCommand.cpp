@@ -15,6 +15,7 @@
 #include "namedPaths.hpp"
 #include "names.hpp"
 #include "refusals.hpp"
+#include "runStoppable.hpp"
 #include "states.hpp"
 
 namespace vclink::shell
@@ -49,9 +50,17 @@ class ResolvedCommand : public Command
                      [&](const NamedPath &path) { return explain(root, path, conflicts, files); });
         refuseStrays("Nothing was marked as resolved", adapter, {named}, files,
                      [](FileState::State state) { return state != FileState::Clean; });
-        for (const upath &file : files)
+        const ExitStatus status = runStoppable(session,
+                                               [&]
+                                               {
+                                                   for (const upath &file : files)
+                                                   {
+                                                       adapter.markResolved(file);
+                                                   }
+                                               });
+        if (status != Done)
         {
-            adapter.markResolved(file);
+            return status;
         }
         const FileStateMap leftOut = findLeftOut(adapter, conflicts, isInConflict);
         remark(conflicts.empty()

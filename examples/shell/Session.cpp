@@ -7,6 +7,7 @@
 
 #include "failures.hpp"
 #include "names.hpp"
+#include "workingCopy.hpp"
 
 namespace vclink::shell
 {
@@ -32,8 +33,29 @@ std::string describeSearch(const std::filesystem::path &start)
     return text;
 }
 
+/// A clone may bring a folder laid out as a bare repository, whose configuration names commands.
+/// @throws ShellFailure if that is possible here
+void refuseBareInWorkingCopy(const std::filesystem::path &repository)
+{
+    if (hasGitEntry(repository))
+    {
+        return;
+    }
+    for (std::filesystem::path folder = repository; folder.has_relative_path();)
+    {
+        folder = folder.parent_path();
+        if (hasGitEntry(folder))
+        {
+            throw ShellFailure(repository.string() +
+                               " is a bare repository inside the working copy " + folder.string() +
+                               ". If it came with a clone, its\nconfiguration did too, and may "
+                               "name commands that then run. If you trust it, use --bare.");
+        }
+    }
+}
+
 /// The back end serves the very root of a working copy, so the search upwards is the host's.
-upath findRoot(const CMAdapterFactory &factory)
+upath findRoot(const CMAdapterFactory &factory, bool takesAnyBare)
 {
     const std::filesystem::path start = currentFolder();
     for (std::filesystem::path folder = start;; folder = folder.parent_path())
@@ -42,6 +64,10 @@ upath findRoot(const CMAdapterFactory &factory)
         // A ".git" folder can be opened too, but the files belong to the folder that holds it.
         if (folder.filename() != ".git" && factory.isAdapterFor(candidate))
         {
+            if (!takesAnyBare)
+            {
+                refuseBareInWorkingCopy(folder);
+            }
             return candidate;
         }
         if (!folder.has_relative_path())
@@ -53,8 +79,8 @@ upath findRoot(const CMAdapterFactory &factory)
 
 } // namespace
 
-Session::Session(Output &output, ProgressLine &progressLine)
-    : output_(output), progressLine_(progressLine),
+Session::Session(Output &output, ProgressLine &progressLine, bool takesAnyBare)
+    : output_(output), progressLine_(progressLine), takesAnyBare_(takesAnyBare),
       interactor_(std::make_shared<ShellInteractor>(progressLine))
 {
 }
@@ -88,12 +114,22 @@ CMAdapter &Session::adapter()
         {
             // Held until the adapter has a guard of its own, so that libgit2 starts only once.
             const git::LibGit2Guard guard;
-            adapter_ = factory_.createAdapterFor(findRoot(factory_), interactor_);
+            adapter_ = factory_.createAdapterFor(findRoot(factory_, takesAnyBare_), interactor_);
         }
         // Each guard that has ended, those of the search too, took the merge drivers away.
         guard_.emplace();
     }
     return *adapter_;
+}
+
+void Session::endBySignal(int signal) noexcept
+{
+    endingSignal_ = signal;
+}
+
+std::optional<int> Session::endingSignal() const noexcept
+{
+    return endingSignal_;
 }
 
 } // namespace vclink::shell

@@ -22,7 +22,8 @@ class Session
 {
   public:
     /// @param output, progressLine must outlive the session
-    Session(Output &output, ProgressLine &progressLine);
+    /// @param takesAnyBare whether to work in a bare repository inside a working copy, too
+    Session(Output &output, ProgressLine &progressLine, bool takesAnyBare = false);
     Session(const Session &) = delete;
     Session &operator=(const Session &) = delete;
     ~Session();
@@ -33,12 +34,20 @@ class Session
     const std::shared_ptr<ShellInteractor> &interactor() const noexcept;
 
     /// The adapter of the working copy that the current folder lies in; made at the first call.
-    /// @throws ShellFailure when the current folder lies in none, and what the back end raises
+    /// @throws ShellFailure if the current folder is in none, or in a bare repository inside a
+    ///         working copy, and what the back end throws
     CMAdapter &adapter();
+
+    /// Notes that the program is to end as by this signal, whatever the command's own status is.
+    void endBySignal(int signal) noexcept;
+    /// The signal that the program is to end as by.
+    std::optional<int> endingSignal() const noexcept;
 
   private:
     Output &output_;
     ProgressLine &progressLine_;
+    bool takesAnyBare_;
+    std::optional<int> endingSignal_;
     git::GitAdapterFactory factory_;
     std::shared_ptr<ShellInteractor> interactor_;
     std::unique_ptr<CMAdapter> adapter_;

@@ -4,6 +4,8 @@
 #include "Output.hpp"
 #include "Session.hpp"
 #include "commands.hpp"
+#include "failures.hpp"
+#include "unfinished.hpp"
 #include "vclink/git/BranchManager.hpp"
 
 namespace vclink::shell
@@ -25,6 +27,11 @@ class StateCommand : public Command
     {
         const auto manager = git::BranchManager::create(session.adapter());
         session.output().write(manager->getRepositoryState() + '\n');
+        session.output().flush();
+        if (isMergeInterrupted(session.adapter()))
+        {
+            complain(describeUnfinishedMerge(session.adapter()));
+        }
         return Done;
     }
 };

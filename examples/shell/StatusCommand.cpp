@@ -10,6 +10,7 @@
 #include "namedPaths.hpp"
 #include "names.hpp"
 #include "states.hpp"
+#include "workingCopy.hpp"
 
 namespace vclink::shell
 {
@@ -66,6 +67,10 @@ class StatusCommand : public Command
         const upath &root = adapter.getRootFolder();
         const FileStateMap states = paths_->empty() ? adapter.getFolderStates(root)
                                                     : collectStates(adapter, paths_->results());
+        if (states.empty())
+        {
+            refuseUnknownStates(adapter);
+        }
         for (const auto &[path, state] : states)
         {
             writeRecord(session.output(), wordsFor(state), relativeName(path, root));

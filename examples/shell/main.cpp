@@ -11,6 +11,7 @@
 #include "Session.hpp"
 #include "failures.hpp"
 #include "fl/i18n/VkLocale.hpp"
+#include "logFailures.hpp"
 #include "vclink_host/locale.hpp"
 
 namespace vclink::shell
@@ -34,6 +35,26 @@ bool isProgressShown(Progress progress)
            (progress == Progress::WhereSeen && errorsCanBeRedrawn());
 }
 
+/// A signal that asked the program to end decides its status, whatever became of the command.
+ExitStatus runIn(Session &session, Command &command)
+{
+    try
+    {
+        const ExitStatus status = command.run(session);
+        session.output().flush();
+        return session.endingSignal() ? endedBy(*session.endingSignal()) : status;
+    }
+    catch (...)
+    {
+        if (!session.endingSignal())
+        {
+            throw;
+        }
+        reportFailure();
+        return endedBy(*session.endingSignal());
+    }
+}
+
 ExitStatus runCommand(const Settings &settings, Command &command, Output &output)
 {
     for (const std::string &folder : settings.folders)
@@ -48,16 +69,15 @@ ExitStatus runCommand(const Settings &settings, Command &command, Output &output
     {
         vclink_host::setGlobalLocale(fl::i18n::VkLocale(*settings.locale));
     }
+    surviveLogFailures();
     ProgressLine progressLine(isProgressShown(settings.progress));
     std::optional<LogOutput> log;
     if (settings.severities)
     {
         log.emplace(*settings.severities, progressLine);
     }
-    Session session(output, progressLine);
-    const ExitStatus status = command.run(session);
-    output.flush();
-    return status;
+    Session session(output, progressLine, settings.takesAnyBare);
+    return runIn(session, command);
 }
 
 ExitStatus run(int argc, const char *const *argv)

@@ -7,6 +7,7 @@
 
 #include "links.hpp"
 #include "names.hpp"
+#include "workingCopy.hpp"
 
 namespace vclink::shell
 {
@@ -118,6 +119,11 @@ std::vector<NamedPath> lookUp(CMAdapter &adapter, const std::vector<std::string>
         {
             lookUpEntry(adapter, states, named);
         }
+    }
+    if (std::any_of(paths.begin(), paths.end(),
+                    [](const NamedPath &named) { return named.states.empty(); }))
+    {
+        refuseUnknownStates(adapter);
     }
     return paths;
 }

@@ -35,6 +35,7 @@ std::vector<NamedPath> lookUpFolders(CMAdapter &adapter, const std::vector<std::
 /// As lookUpFolders(), with the states of the files too, and with paths as Git has them: a symbolic
 /// link is the entry of that name, not what it leads to. The pattern that a name may be to Git
 /// gives no file of another name.
+/// @throws ShellFailure also if the states of files can't be known
 std::vector<NamedPath> lookUp(CMAdapter &adapter, const std::vector<std::string> &arguments);
 
 /// Whether a path is that of the folder or lies below it; both free of symbolic links.

@@ -10,6 +10,7 @@
 #include "links.hpp"
 #include "names.hpp"
 #include "states.hpp"
+#include "workingCopy.hpp"
 
 namespace vclink::shell
 {
@@ -21,6 +22,21 @@ namespace fs = std::filesystem;
 bool isPattern(const ustring &name)
 {
     return name.find_first_of(u"*?[") != ustring::npos;
+}
+
+/// One question for the whole is cheaper than one for each file, but may be one without an answer.
+FileStateMap statesAfterwards(CMAdapter &adapter, const FileStateMap &files)
+{
+    FileStateMap states = adapter.getFolderStates(adapter.getRootFolder());
+    if (states.empty())
+    {
+        states = adapter.getFileStates(addressable(files, adapter.getRootFolder()));
+    }
+    if (states.empty())
+    {
+        refuseUnknownStates(adapter);
+    }
+    return states;
 }
 
 } // namespace
@@ -132,7 +148,7 @@ FileStateMap findLeftOut(CMAdapter &adapter, const FileStateMap &files,
     FileStateMap leftOut;
     if (!files.empty())
     {
-        for (const auto &entry : filter(adapter.getFolderStates(adapter.getRootFolder()), matters))
+        for (const auto &entry : filter(statesAfterwards(adapter, files), matters))
         {
             if (files.count(entry.first) != 0)
             {

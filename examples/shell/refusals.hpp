@@ -41,6 +41,7 @@ std::string explainUntracked(const upath &root, const NamedPath &named);
 
 /// Those of these files that now still have a state that `matters` holds for, in spite of what was
 /// done.
+/// @throws ShellFailure if their states can't be known
 FileStateMap findLeftOut(CMAdapter &adapter, const FileStateMap &files,
                          const std::function<bool(FileState::State)> &matters);
 

@@ -1,7 +1,6 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
-#include <cstddef>
 #include <optional>
 #include <string>
 
@@ -14,10 +13,5 @@ namespace vclink::shell
 /// can't be read.
 std::optional<std::string> findRevision(const git::BranchManager &manager,
                                         const std::string &revision);
-
-/// Whether a commit is in the history of HEAD, or HEAD itself. Looks at no more than this number of
-/// commits, those nearest to HEAD first, and answers "no" if they do not tell.
-/// @param id as findRevision() gives it
-bool isInHistory(const git::BranchManager &manager, const std::string &id, std::size_t limit);
 
 } // namespace vclink::shell

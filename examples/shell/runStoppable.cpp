@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "runStoppable.hpp"
 
+#include <csignal>
 #include <string>
 
 #include "InterruptWatch.hpp"
@@ -17,23 +18,32 @@ ExitStatus runStoppable(Session &session, const std::function<void()> &operation
     ShellInteractor &interactor = *session.interactor();
     const auto tell = [&line](const std::string &text)
     { line.clearFor([&text] { complain(text + " Ctrl-C ends the program at once now."); }); };
-    const InterruptWatch watch(interactor.getTerminator(), interactor.activity(), tell);
+    InterruptWatch watch(interactor.getTerminator(), interactor.activity(), tell);
+    const auto end = [&]
+    {
+        watch.end();
+        if (watch.askedBy() != 0 && watch.askedBy() != SIGINT)
+        {
+            session.endBySignal(watch.askedBy());
+        }
+        line.clear();
+    };
     try
     {
         operation();
     }
     catch (...)
     {
-        if (!watch.wasAsked())
+        end();
+        if (watch.askedBy() == 0)
         {
             throw;
         }
-        line.clear();
         reportFailure();
-        return Cancelled;
+        return endedBy(watch.askedBy());
     }
-    line.clear();
-    if (watch.wasAsked())
+    end();
+    if (watch.askedBy() != 0)
     {
         remark("It was too far on to be stopped.");
     }

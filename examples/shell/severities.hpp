@@ -13,6 +13,9 @@ inline constexpr const char *libraryLogger = "vclink::git";
 /// The severity of what an operation or a callback is told.
 inline constexpr unsigned parameterSeverity = 0x02;
 
+/// The severity of decisions and failures.
+inline constexpr unsigned diagnosticSeverity = 0x08;
+
 /// The mask that a list of severities means: names separated by commas, or a number, decimal or
 /// with "0x" hexadecimal. Nothing if it can't be understood.
 std::optional<unsigned> parseSeverities(const std::string &text);

@@ -4,10 +4,12 @@
 #include <filesystem>
 #include <fstream>
 #include <string>
+#include <system_error>
 
 #include "failures.hpp"
 #include "names.hpp"
 #include "vclink/git/BranchManager.hpp"
+#include "workingCopy.hpp"
 
 namespace vclink::shell
 {
@@ -39,17 +41,6 @@ constexpr Operation series = {"", "a series of picked or reverted commits",
                               "Go on with \"git cherry-pick --continue\", or \"git revert "
                               "--continue\""};
 
-/// Where Git keeps the state of a working copy.
-fs::path stateFolder(const fs::path &root)
-{
-    const fs::path place = root / ".git";
-    std::ifstream file(place);
-    const std::string key = "gitdir: ";
-    std::string line;
-    const bool isElsewhere = std::getline(file, line) && line.rfind(key, 0) == 0;
-    return isElsewhere ? root / line.substr(key.size()) : place;
-}
-
 /// Whether commits are still to be picked or reverted after the one that is under way.
 bool isInSeries(const fs::path &root)
 {
@@ -75,6 +66,18 @@ const Operation *findOperation(CMAdapter &adapter)
     return isInSeries(nativePath(adapter.getRootFolder())) ? &series : nullptr;
 }
 
+bool stands(CMAdapter &adapter, const char *name)
+{
+    std::error_code ignored;
+    return fs::exists(stateFolder(nativePath(adapter.getRootFolder())) / name, ignored);
+}
+
+bool isMerging(CMAdapter &adapter)
+{
+    return git::BranchManager::create(adapter)->getRepositoryState() == "Conflicts" &&
+           stands(adapter, "MERGE_HEAD");
+}
+
 } // namespace
 
 void refuseHalfWay(CMAdapter &adapter)
@@ -86,6 +89,26 @@ void refuseHalfWay(CMAdapter &adapter)
                            "with --as-is it is made all the same.\n" +
                            operation->wayOn + '.');
     }
+}
+
+bool isMergeInterrupted(CMAdapter &adapter)
+{
+    // Of the library; it removes what is left of it once no merge is under way.
+    return isMerging(adapter) && stands(adapter, "vclink-merge");
+}
+
+std::string describeUnfinishedMerge(CMAdapter &adapter)
+{
+    if (!isMerging(adapter))
+    {
+        return {};
+    }
+    return isMergeInterrupted(adapter)
+               ? "A merge was interrupted before all of it was written, and can't be concluded. "
+                 "\"vclink-shell commit\"\nsays so, and names the commands that bring the working "
+                 "copy back as it was before."
+               : "A merge is under way. Conclude it with \"vclink-shell commit\", or undo it with "
+                 "\"git merge --abort\".";
 }
 
 } // namespace vclink::shell

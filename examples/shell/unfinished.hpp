@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include <string>
+
 #include "vclink/CMAdapter.hpp"
 
 namespace vclink::shell
@@ -9,5 +11,11 @@ namespace vclink::shell
 /// @throws ShellFailure in the midst of what has more to do than one commit, e.g. a rebase: a
 /// commit of the back end ends it, and the rest is dropped without a word
 void refuseHalfWay(CMAdapter &adapter);
+
+/// Whether a merge is under way that was killed before all of it was written.
+bool isMergeInterrupted(CMAdapter &adapter);
+
+/// How to go on with a merge that is under way, or that was interrupted; empty if there is none.
+std::string describeUnfinishedMerge(CMAdapter &adapter);
 
 } // namespace vclink::shell

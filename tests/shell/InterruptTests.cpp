@@ -114,6 +114,36 @@ TEST_F(ShellInterrupt, ComesTooLateOnceFilesAreWritten)
     EXPECT_EQ(countChanges(), 0U);
 }
 
+TEST_F(ShellInterrupt, OfAnotherKindCancelsToo)
+{
+    for (const int signal : {SIGTERM, SIGHUP})
+    {
+        TerminalProcess process = start("exec \"$0\" --log progress revert .");
+        process.readUntil("Checkout Notify");
+        process.send(signal);
+        const std::string text = process.readAll();
+        const int status = process.wait();
+        ASSERT_TRUE(WIFEXITED(status)) << text;
+        EXPECT_EQ(WEXITSTATUS(status), 128 + signal);
+        EXPECT_THAT(text, EndsWith("\nvclink-shell: The operation was cancelled.\n"));
+        EXPECT_EQ(countChanges(), static_cast<std::size_t>(fileCount));
+        EXPECT_FALSE(std::filesystem::exists(repository_ / ".git/index.lock"));
+    }
+}
+
+TEST_F(ShellInterrupt, OfAnotherKindLetsTheProgramEndAsByItWhenItComesTooLate)
+{
+    TerminalProcess process = start("exec \"$0\" --log parameter revert .");
+    process.readUntil("completed_steps=1 ");
+    process.send(SIGTERM);
+    const std::string text = process.readAll();
+    const int status = process.wait();
+    ASSERT_TRUE(WIFEXITED(status)) << text;
+    EXPECT_EQ(WEXITSTATUS(status), 143);
+    EXPECT_THAT(text, EndsWith("It was too far on to be stopped.\nReverted 1000 files.\n"));
+    EXPECT_EQ(countChanges(), 0U);
+}
+
 TEST_F(ShellInterrupt, IsIgnoredWhereItWasIgnoredBefore)
 {
     TerminalProcess process = start("trap '' INT; exec \"$0\" --log progress revert .");

@@ -1,10 +1,12 @@
 // SPDX-License-Identifier: MIT
+#include <array>
 #include <atomic>
 #include <cerrno>
 #include <chrono>
 #include <csignal>
 #include <string>
 #include <thread>
+#include <utility>
 #include <vector>
 
 #include <fcntl.h>
@@ -22,12 +24,19 @@ namespace
 
 using namespace std::chrono_literals;
 
-void (*handlerOfInterrupt())(int)
+void (*handlerOf(int signal))(int)
 {
     struct sigaction action = {};
-    ::sigaction(SIGINT, nullptr, &action);
+    ::sigaction(signal, nullptr, &action);
     return action.sa_handler;
 }
+
+void (*handlerOfInterrupt())(int)
+{
+    return handlerOf(SIGINT);
+}
+
+const std::array<int, 3> watched{SIGINT, SIGTERM, SIGHUP};
 
 /// A handler that is not the default.
 void otherHandler(int /*signal*/)
@@ -86,13 +95,17 @@ class InterruptWatch : public testing::Test
   protected:
     InterruptWatch()
     {
-        ::sigaction(SIGINT, nullptr, &previous_);
-        std::signal(SIGINT, SIG_DFL);
+        for (std::size_t index = 0; index < watched.size(); ++index)
+        {
+            ::sigaction(watched[index], nullptr, &previous_[index]);
+            std::signal(watched[index], SIG_DFL);
+        }
     }
     ~InterruptWatch() override
     {
         standsUntilRestored = false;
-        ::sigaction(SIGINT, &previous_, nullptr);
+        for (std::size_t index = 0; index < watched.size(); ++index)
+            ::sigaction(watched[index], &previous_[index], nullptr);
     }
 
     /// Watches while `action` runs; all signals have been answered after that.
@@ -108,11 +121,11 @@ class InterruptWatch : public testing::Test
         action(watch);
     }
     /// Presses Ctrl-C, and waits until it is answered. Only the first can be seen from outside.
-    void pressFirst(const shell::InterruptWatch &watch)
+    void pressFirst(const shell::InterruptWatch &watch, int signal = SIGINT)
     {
-        std::raise(SIGINT);
+        std::raise(signal);
         EXPECT_TRUE(waitUntil([this] { return poller_.checkAndResetCancelledState(); }));
-        EXPECT_TRUE(watch.wasAsked());
+        EXPECT_EQ(watch.askedBy(), signal);
     }
 
     Terminator terminator_;
@@ -123,18 +136,44 @@ class InterruptWatch : public testing::Test
     void (*handlerThen_)(int) = SIG_ERR;
 
   private:
-    struct sigaction previous_ = {};
+    std::array<struct sigaction, watched.size()> previous_{};
 };
 
 TEST_F(InterruptWatch, AsksOnTheTerminatorAtTheFirst)
 {
-    watch(
-        [this](const shell::InterruptWatch &watch)
-        {
-            EXPECT_FALSE(watch.wasAsked());
-            pressFirst(watch);
-        });
-    EXPECT_EQ(givenUp_, 0);
+    for (const int signal : watched)
+    {
+        watch(
+            [this, signal](const shell::InterruptWatch &watch)
+            {
+                EXPECT_EQ(watch.askedBy(), 0);
+                pressFirst(watch, signal);
+            });
+        EXPECT_EQ(givenUp_, 0);
+    }
+}
+
+TEST_F(InterruptWatch, NamesTheSignalThatWantsTheProcessToEndBeforeCtrlC)
+{
+    for (const auto &[first, second] : {std::pair(SIGINT, SIGTERM), std::pair(SIGTERM, SIGINT)})
+    {
+        shell::InterruptWatch watch(terminator_, activity_, [](const std::string &) {});
+        pressFirst(watch, first);
+        std::raise(second);
+        watch.end();
+        EXPECT_EQ(watch.askedBy(), SIGTERM);
+    }
+}
+
+TEST_F(InterruptWatch, HasAnsweredAtItsEndWhateverCameBefore)
+{
+    for (int time = 0; time < 200; ++time)
+    {
+        shell::InterruptWatch watch(terminator_, activity_, [](const std::string &) {});
+        std::raise(SIGTERM);
+        watch.end();
+        ASSERT_EQ(watch.askedBy(), SIGTERM);
+    }
 }
 
 TEST_F(InterruptWatch, AsksOnlyOnce)
@@ -153,6 +192,7 @@ TEST_F(InterruptWatch, AsksOnlyOnce)
 TEST_F(InterruptWatch, RestoresTheDefaultWhenNothingWasHeardForThreeSeconds)
 {
     std::signal(SIGINT, otherHandler);
+    std::signal(SIGHUP, SIG_IGN);
     watch(
         [this](const shell::InterruptWatch &watch)
         {
@@ -161,6 +201,8 @@ TEST_F(InterruptWatch, RestoresTheDefaultWhenNothingWasHeardForThreeSeconds)
             std::raise(SIGINT);
             ASSERT_TRUE(waitUntil([this] { return givenUp_ == 1; }));
             EXPECT_EQ(handlerThen_, SIG_DFL);
+            EXPECT_EQ(handlerOf(SIGTERM), SIG_DFL);
+            EXPECT_EQ(handlerOf(SIGHUP), SIG_IGN);
             EXPECT_EQ(reason_, "Nothing was heard of the operation for a while.");
         });
     EXPECT_EQ(handlerOfInterrupt(), otherHandler);
@@ -248,24 +290,27 @@ TEST_F(InterruptWatch, ChangesNothingWhileTheBackEndIsHeardOf)
 
 TEST_F(InterruptWatch, RestoresWhatStoodBeforeAtItsEnd)
 {
-    for (void (*const handler)(int) : {SIG_DFL, otherHandler})
+    for (const int signal : watched)
     {
-        std::signal(SIGINT, handler);
-        watch([handler](const shell::InterruptWatch &)
-              { EXPECT_NE(handlerOfInterrupt(), handler); });
-        EXPECT_EQ(handlerOfInterrupt(), handler);
+        for (void (*const handler)(int) : {SIG_DFL, otherHandler})
+        {
+            std::signal(signal, handler);
+            watch([&](const shell::InterruptWatch &) { EXPECT_NE(handlerOf(signal), handler); });
+            EXPECT_EQ(handlerOf(signal), handler);
+        }
     }
 }
 
-TEST_F(InterruptWatch, LeavesTheSignalIgnoredWhereItWas)
+TEST_F(InterruptWatch, LeavesASignalIgnoredWhereItWasAndTakesTheOthers)
 {
     std::signal(SIGINT, SIG_IGN);
     watch(
-        [](const shell::InterruptWatch &watch)
+        [this](const shell::InterruptWatch &watch)
         {
             std::raise(SIGINT);
             EXPECT_EQ(handlerOfInterrupt(), SIG_IGN);
-            EXPECT_FALSE(watch.wasAsked());
+            EXPECT_EQ(watch.askedBy(), 0);
+            pressFirst(watch, SIGHUP);
         });
     EXPECT_EQ(handlerOfInterrupt(), SIG_IGN);
     EXPECT_FALSE(poller_.checkAndResetCancelledState());
@@ -278,7 +323,8 @@ TEST_F(InterruptWatch, BlocksNoSignalWhereItIsMade)
         {
             sigset_t blocked;
             ::pthread_sigmask(SIG_SETMASK, nullptr, &blocked);
-            EXPECT_EQ(::sigismember(&blocked, SIGINT), 0);
+            for (const int signal : watched)
+                EXPECT_EQ(::sigismember(&blocked, signal), 0);
         });
 }
 

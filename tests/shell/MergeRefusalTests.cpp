@@ -8,31 +8,46 @@ namespace vclink::test
 namespace
 {
 
+using testing::AllOf;
 using testing::HasSubstr;
+using testing::Not;
 using testing::StartsWith;
 
-/// A merge puts back missing files without a word, and the back end names the first changed one
-/// only.
+/// The back end refuses a merge that would lose work. The program shows its words, and asks for no
+/// states itself.
 class ShellMergeOverChanges : public ShellMergeTest
 {
   protected:
-    static std::string refusal(const std::string &names)
+    /// Expects that the merge is refused with this text, and leaves the files and the branch.
+    void expectRefused(const std::string &text) const
     {
-        return "Nothing was merged. These files are changed, and a merge could put them back as "
-               "they are in\nthe last commit, or be refused:\n" +
-               names +
-               "Commit the changes first, or throw them away with \"vclink-shell revert\". With "
-               "--force the merge\nis tried beside them.\n";
+        const std::string before = describe(repository_);
+        EXPECT_THAT(fail({"merge", "other"}),
+                    AllOf(StartsWith("vclink-shell: \"other\" could not be merged into the current "
+                                     "branch.\n"),
+                          HasSubstr(text), Not(HasSubstr("conflict:"))));
+        EXPECT_EQ(describe(repository_), before);
+        EXPECT_EQ(state(), "Normal\n");
     }
 };
 
-TEST_F(ShellMergeOverChanges, IsRefusedAndNamesThem)
+TEST_F(ShellMergeOverChanges, ShowsWhatTheBackEndRefuses)
 {
     diverge();
     repository_.write("folder/c", "edited\n");
-    repository_.remove("folder/deep/d");
-    repository_.write("untracked", "");
-    EXPECT_EQ(refuse({"merge", "other"}), refusal("  folder/c\n  folder/deep/d\n"));
+    expectRefused("the uncommitted changes of 'folder/c' would be lost in the merge");
+    repository_.git({"checkout", "--quiet", "folder/c"});
+    repository_.write("new", "untracked\n");
+    expectRefused("(code -13, ");
+    EXPECT_EQ(repository_.read("new"), "untracked\n");
+}
+
+TEST_F(ShellMergeOverChanges, ShowsTheWayOutOfTheBackEnd)
+{
+    diverge();
+    repository_.git({"update-index", "--assume-unchanged", "folder/c"});
+    repository_.write("folder/c", "edited\n");
+    expectRefused("take the mark away with 'git update-index --no-assume-unchanged' and commit");
 }
 
 TEST_F(ShellMergeOverChanges, IsRefusedWhereALinkHasTakenAFilesPlace)
@@ -40,72 +55,40 @@ TEST_F(ShellMergeOverChanges, IsRefusedWhereALinkHasTakenAFilesPlace)
     diverge();
     repository_.remove("folder/c");
     repository_.symlink("../a", "folder/c");
-    EXPECT_EQ(refuse({"merge", "other"}), refusal("  folder/c\n"));
+    expectRefused("folder/c");
 }
 
-TEST_F(ShellMergeOverChanges, IsRefusedForAFastForwardToo)
+TEST_F(ShellMergeOverChanges, IsRefusedOverStagedChangesAndChangesOfTheSameFiles)
 {
-    makeBranch("other", {{"a", "theirs\n"}});
-    repository_.write("b", "edited\n");
-    EXPECT_EQ(refuse({"merge", "other"}), refusal("  b\n"));
-}
-
-TEST_F(ShellMergeOverChanges, NamesThemWhateverTheirNames)
-{
-    commitFiles({{"new\nline", "begin\n"}, {"quo\"te", "begin\n"}});
     diverge();
-    repository_.write("new\nline", "edited\n");
-    repository_.write("quo\"te", "edited\n");
-    EXPECT_EQ(refuse({"merge", "other"}), refusal("  \"new\\nline\"\n  \"quo\\\"te\"\n"));
+    repository_.write("folder/c", "edited\n");
+    repository_.add({"folder/c"});
+    expectRefused("(code -13, ");
+    repository_.git({"reset", "--quiet", "--hard"});
+    repository_.write("a", "edited\n");
+    expectRefused("(code -13, ");
 }
 
 TEST_F(ShellMergeOverChanges, GoesOnWhereNothingIsLost)
 {
     diverge();
     repository_.write("untracked", "untracked\n");
+    repository_.remove("folder/deep/d");
     EXPECT_THAT(run({"merge", "other"}).output, StartsWith("Merge commit "));
     EXPECT_EQ(repository_.read("untracked"), "untracked\n");
-}
-
-TEST_F(ShellMergeOverChanges, BringsMissingFilesBackByForceButLosesNoChange)
-{
-    diverge();
-    repository_.write("folder/c", "edited\n");
-    repository_.remove("folder/deep/d");
-    EXPECT_THAT(fail({"merge", "--force", "other"}),
-                HasSubstr("the uncommitted changes of 'folder/c' would be lost in the merge"));
-    EXPECT_EQ(repository_.read("folder/c"), "edited\n");
-    repository_.git({"checkout", "folder/c"});
-    EXPECT_THAT(run({"merge", "--force", "other"}).output, StartsWith("Merge commit "));
     EXPECT_EQ(repository_.read("folder/deep/d"), "folder/deep/d\n");
-    EXPECT_EQ(repository_.git({"status", "--porcelain"}), "");
 }
 
-TEST_F(ShellMergeOverChanges, FastForwardsByForceAndKeepsWhatTheBranchDoesNotTouch)
+TEST_F(ShellMergeOverChanges, FastForwardsAndKeepsWhatTheBranchDoesNotTouch)
 {
     makeBranch("other", {{"a", "theirs\n"}});
     repository_.write("b", "edited\n");
-    EXPECT_THAT(run({"merge", "--force", "other"}).output, StartsWith("Fast-forward to "));
+    EXPECT_THAT(run({"merge", "other"}).output, StartsWith("Fast-forward to "));
     EXPECT_EQ(repository_.read("b"), "edited\n");
     EXPECT_EQ(repository_.read("a"), "theirs\n");
 }
 
-TEST_F(ShellMergeOverChanges, FailsOverStagedChangesAndChangesOfTheSameFilesAlsoByForce)
-{
-    diverge();
-    repository_.write("folder/c", "edited\n");
-    repository_.add({"folder/c"});
-    EXPECT_EQ(refuse({"merge", "other"}), refusal("  folder/c\n"));
-    EXPECT_THAT(fail({"merge", "--force", "other"}), HasSubstr("(code -13, "));
-    EXPECT_EQ(letters().at("folder/c"), "M ");
-    repository_.git({"reset", "--quiet", "--hard"});
-    repository_.write("a", "edited\n");
-    EXPECT_THAT(fail({"merge", "--force", "other"}), HasSubstr("(code -13, "));
-    EXPECT_EQ(repository_.read("a"), "edited\n");
-    EXPECT_EQ(state(), "Normal\n");
-}
-
-TEST_F(ShellMergeOverChanges, IsNotRefusedWhenThereIsNothingToDo)
+TEST_F(ShellMergeOverChanges, DoesNothingWhenThereIsNothingToDo)
 {
     repository_.git({"branch", "old"});
     diverge();
@@ -124,8 +107,16 @@ TEST_F(ShellMergeOverChanges, FailsInTheWordsOfTheBackEndWhereItCannotBegin)
     repository_.git({"checkout", "--quiet", "a"});
     clash();
     fail({"merge", "other"});
-    repository_.write("folder/c", "edited\n");
-    EXPECT_THAT(refuse({"merge", "other"}), HasSubstr("A merge cannot begin while"));
+    EXPECT_THAT(refuse({"merge", "other"}),
+                AllOf(HasSubstr("A merge cannot begin while"),
+                      HasSubstr("\nvclink-shell: A merge is under way. Conclude it with "
+                                "\"vclink-shell commit\", or undo it with \"git merge "
+                                "--abort\".\n")));
+}
+
+TEST_F(ShellMergeOverChanges, TakesNoForce)
+{
+    EXPECT_EQ(run({"merge", "--force", "other"}).exitStatus, 2);
 }
 
 } // namespace

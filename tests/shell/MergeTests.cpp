@@ -195,7 +195,6 @@ TEST_F(ShellMerge, DoesNotBeginBeforeAnotherOperationIsFinished)
     const std::string errors = refuse({"merge", "other"});
     EXPECT_THAT(errors, HasSubstr("A merge cannot begin while another operation"));
     EXPECT_THAT(errors, Not(HasSubstr("in conflict")));
-    EXPECT_THAT(refuse({"merge", "--force", "main"}), HasSubstr("A merge cannot begin"));
 }
 
 TEST_F(ShellMerge, DoesNotBeginBeforeTheFirstCommit)

@@ -90,7 +90,12 @@ bool TerminalProcess::readMore()
 
 void TerminalProcess::interrupt() const
 {
-    if (::kill(process_, SIGINT) != 0)
+    send(SIGINT);
+}
+
+void TerminalProcess::send(int signal) const
+{
+    if (::kill(process_, signal) != 0)
         throw std::system_error(errno, std::generic_category(), "kill");
 }
 

@@ -34,6 +34,8 @@ class TerminalProcess
 
     /// Sends SIGINT to the program, and to nobody else.
     void interrupt() const;
+    /// Sends a signal to the program, and to nobody else.
+    void send(int signal) const;
 
     /// Waits for the end of the program, after which readAll() has returned.
     /// @return the status as waitpid() gives it

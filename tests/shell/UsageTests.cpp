@@ -73,7 +73,7 @@ TEST_F(ShellUsage, EndsWithTwoAndAReasonWhenTheArgumentsMakeNoSense)
         {{"merge"}, "NAME is required."},
         {{"merge", ""}, "NAME: it may not be empty."},
         {{"merge", "a", "b"}, "\"b\" was not expected."},
-        {{"merge", "--force"}, "NAME is required."},
+        {{"merge", "a", "--force"}, "\"--force\" was not expected."},
         {{"attr"}, "PATH is required."},
         {{"attr", "a"}, "NAME is required."},
         {{"attr", "a", "b", ""}, "NAME: it may not be empty."},

@@ -2,6 +2,7 @@
 #include <chrono>
 #include <csignal>
 #include <functional>
+#include <optional>
 #include <stdexcept>
 #include <thread>
 
@@ -31,11 +32,11 @@ class RunStoppable : public testing::Test
         status_ = shell::runStoppable(session_, operation);
         return testing::internal::GetCapturedStderr();
     }
-    /// Presses Ctrl-C, and goes on when the request has arrived.
-    void ask()
+    /// Sends a signal, and goes on when the request has arrived.
+    void ask(int signal = SIGINT)
     {
         PollableTerminator poller(session_.interactor()->getTerminator());
-        std::raise(SIGINT);
+        std::raise(signal);
         const auto end = std::chrono::steady_clock::now() + 30s;
         while (!poller.checkAndResetCancelledState())
         {
@@ -80,6 +81,31 @@ TEST_F(RunStoppable, EndsAsCancelledForAnyFailureAfterThePersonAskedToStop)
                   }),
               "vclink-shell: It broke.\n");
     EXPECT_EQ(status_, 130);
+}
+
+TEST_F(RunStoppable, LetsTheProgramEndAsBySigtermOrSighupWhateverBecameOfTheOperation)
+{
+    for (const int signal : {SIGTERM, SIGHUP})
+    {
+        EXPECT_EQ(tell([&] { ask(signal); }), "");
+        EXPECT_EQ(status_, 0);
+        EXPECT_EQ(session_.endingSignal(), signal);
+        EXPECT_EQ(tell(
+                      [&]
+                      {
+                          ask(signal);
+                          throw util::exception::CancelledOperationException();
+                      }),
+                  "vclink-shell: The operation was cancelled.\n");
+        EXPECT_EQ(status_, 128 + signal);
+        EXPECT_EQ(session_.endingSignal(), signal);
+    }
+}
+
+TEST_F(RunStoppable, LeavesTheProgramsStatusToTheCommandAfterCtrlC)
+{
+    tell([this] { ask(); });
+    EXPECT_EQ(session_.endingSignal(), std::nullopt);
 }
 
 TEST_F(RunStoppable, LeavesOtherFailuresToTheCaller)

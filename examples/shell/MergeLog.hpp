@@ -1,0 +1,37 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <cstddef>
+#include <map>
+#include <string>
+
+#include "RecordReader.hpp"
+
+namespace vclink::shell
+{
+
+/// What became known of the commands that a merge ran.
+struct MergeNotes
+{
+    /// the driver whose command ran last
+    std::string driver;
+    /// how many files the command of each driver has refused
+    std::map<std::string, std::size_t> refusals;
+};
+
+/// Takes the note that a record of the library's log is of, if it is of any.
+void takeNote(MergeNotes &notes, const std::string &record);
+
+/// While it lives, takes notes from the library's log: the back end does not tell which commands
+/// have refused a file. At most one object at a time.
+class MergeLog
+{
+  public:
+    /// @param notes outlives the object
+    explicit MergeLog(MergeNotes &notes);
+
+  private:
+    RecordReader reader_;
+};
+
+} // namespace vclink::shell

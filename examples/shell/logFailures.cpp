@@ -1,0 +1,57 @@
+// SPDX-License-Identifier: MIT
+#include "logFailures.hpp"
+
+#include <atomic>
+#include <exception>
+#include <memory>
+#include <string>
+
+#include <boost/log/core.hpp>
+
+#include "failures.hpp"
+
+namespace vclink::shell
+{
+namespace
+{
+
+/// In a handler only.
+void reportLostRecord() noexcept
+{
+    try
+    {
+        try
+        {
+            throw;
+        }
+        catch (const std::exception &failure)
+        {
+            complain(std::string("The log is incomplete: ") + failure.what() + '.');
+        }
+        catch (...)
+        {
+            complain("The log is incomplete, for a reason that is not known.");
+        }
+    }
+    catch (const std::exception &)
+    {
+        // There is no memory for a report either.
+    }
+}
+
+} // namespace
+
+void surviveLogFailures()
+{
+    const auto isReported = std::make_shared<std::atomic<bool>>(false);
+    boost::log::core::get()->set_exception_handler(
+        [isReported]
+        {
+            if (!isReported->exchange(true))
+            {
+                reportLostRecord();
+            }
+        });
+}
+
+} // namespace vclink::shell

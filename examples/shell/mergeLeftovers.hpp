@@ -1,0 +1,21 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include "MergeLog.hpp"
+#include "vclink/CMAdapter.hpp"
+#include "vclink/FileStateMap.hpp"
+
+/// What a merge with conflicts leaves in the working copy, beside the files in conflict.
+namespace vclink::shell
+{
+
+/// The files in conflict that a merge command refused. They may have no conflict markers.
+/// @param conflicts the files in conflict
+FileStateMap findRefused(CMAdapter &adapter, const FileStateMap &conflicts,
+                         const MergeNotes &notes);
+
+/// The files that have another name than in the commits, because something else has theirs.
+/// @param states of the whole working copy
+FileStateMap findSetAside(const FileStateMap &states);
+
+} // namespace vclink::shell

@@ -1,0 +1,29 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <filesystem>
+
+#include "vclink/CMAdapter.hpp"
+#include "vclink/FileStateMap.hpp"
+
+/// What the back end does not say of a working copy.
+namespace vclink::shell
+{
+
+/// Whether a folder has an entry ".git", which a bare repository has not.
+bool hasGitEntry(const std::filesystem::path &folder);
+
+/// The folder in which Git keeps the state of a working copy.
+/// @param root of the working copy
+std::filesystem::path stateFolder(const std::filesystem::path &root);
+
+/// The states of all files of the working copy.
+/// @throws ShellFailure if they can't be known
+FileStateMap wholeStates(CMAdapter &adapter);
+
+/// If libgit2 can't read a working copy, the back end reports no file at all, which looks like a
+/// working copy without changes.
+/// @throws ShellFailure in that case; to be called if a question about states brought none
+void refuseUnknownStates(CMAdapter &adapter);
+
+} // namespace vclink::shell
