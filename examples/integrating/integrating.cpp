@@ -4,6 +4,8 @@
 #include <functional>
 #include <iostream>
 #include <memory>
+#include <optional>
+#include <shared_mutex>
 #include <string>
 #include <utility>
 
@@ -12,6 +14,7 @@
 #include <boost/log/expressions.hpp>
 #include <boost/log/sinks/sync_frontend.hpp>
 #include <boost/log/sinks/text_ostream_backend.hpp>
+#include <boost/log/utility/exception_handler.hpp>
 #include <boost/make_shared.hpp>
 
 #include "fl/i18n/VkLocale.hpp"
@@ -20,6 +23,7 @@
 #include "foundation/core/except/IUserException.hpp"
 #include "vclink/ApplicationInteractor.hpp"
 #include "vclink/CMAdapter.hpp"
+#include "vclink/FileStateMap.hpp"
 #include "vclink/exception/SourceControlException.hpp"
 #include "vclink/git/BranchManager.hpp"
 #include "vclink/git/GitAdapterFactory.hpp"
@@ -83,12 +87,20 @@ void fetchAndMerge(const upath &folder, const std::shared_ptr<Interactor> &inter
     branches->merge("origin/main");
 }
 
-void mergeAfterProbing(vclink::CMAdapter &adapter, const upath &other)
+/// One for the process.
+std::shared_mutex &guardMutex();
+
+bool probe(const upath &folder)
 {
-    const vclink::git::GitAdapterFactory factory;
-    factory.isAdapterFor(other); // its guard has ended, and taken the merge driver away
+    const std::shared_lock<std::shared_mutex> lock(guardMutex());
+    return vclink::git::GitAdapterFactory().isAdapterFor(folder);
+}
+
+void mergeAlone(vclink::CMAdapter &adapter, const std::string &name)
+{
+    const std::unique_lock<std::shared_mutex> lock(guardMutex());
     const vclink::git::LibGit2Guard guard;
-    vclink::git::BranchManager::create(adapter)->merge("topic");
+    vclink::git::BranchManager::create(adapter)->merge(name);
 }
 
 void cancel(Interactor &interactor)
@@ -142,9 +154,32 @@ void mergeTopic(vclink::git::BranchManager &branches)
     }
 }
 
+bool hasFilesInHead(const vclink::git::BranchManager &branches)
+{
+    const std::string emptyTree = "4b825dc642cb6eb9a060e54bf8d69288fbee4904";
+    try
+    {
+        return branches.getRevision("HEAD^{tree}") != emptyTree;
+    }
+    catch (const vclink::git::LibGit2Exception &)
+    {
+        return false; // there is no commit yet
+    }
+}
+
+/// The states of all files; nothing if they cannot be known.
+std::optional<vclink::FileStateMap> readStates(vclink::CMAdapter &adapter)
+{
+    vclink::FileStateMap states = adapter.getFolderStates(adapter.getRootFolder());
+    if (states.empty() && hasFilesInHead(*vclink::git::BranchManager::create(adapter)))
+        return std::nullopt;
+    return states;
+}
+
 void showLog()
 {
     namespace log = boost::log;
+    log::core::get()->set_exception_handler(log::make_exception_suppressor());
     using Sink = log::sinks::synchronous_sink<log::sinks::text_ostream_backend>;
     const auto sink = boost::make_shared<Sink>();
     sink->locked_backend()->add_stream(

@@ -117,6 +117,22 @@ TEST_F(GitConfigFile, KeepsAnInstallPathOfAnyLetters)
     }
 }
 
+TEST_F(GitConfigFile, IsLeftAloneWhereAKeyHasSeveralValuesOrAnIncludedOne)
+{
+    const std::string tool = "[mergetool \"vkMerge\"]\n\tcmd = one\n";
+    writeFile(environment().home() / "included", tool);
+    for (const std::string text :
+         {tool + "\tcmd = two\n",
+          "[include]\n\tpath = " + (environment().home() / "included").string() + '\n'})
+    {
+        writeFile(global(), text);
+        GitConfig config;
+        EXPECT_THROW(config.writeMergeTool(), vclink::git::LibGit2Exception);
+        EXPECT_EQ(read(global()), text);
+    }
+    EXPECT_EQ(read(environment().home() / "included"), tool);
+}
+
 TEST_F(GitConfigFile, IsReadByAnotherObject)
 {
     GitConfig().writeDiffTool();

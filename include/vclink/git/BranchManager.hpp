@@ -91,9 +91,11 @@ class VCLINK_GIT_EXPORT BranchManager
     /// socket or device is in its way; the added text names the first file. The merge drivers may
     /// have run by then. Missing files come back, ignored ones are overwritten.
     ///
-    /// After conflicts the repository is in the state of a merge, with markers in the files in
-    /// conflict, save those that are not text, which are ours: CMAdapter::markResolved and
-    /// CMAdapter::commit go on. git_merge_analysis, git_checkout_tree, git_merge.
+    /// After conflicts the repository is in the state of a merge. Files in conflict have markers
+    /// where both sides changed the same lines; a file that a merge command refused may have none,
+    /// and be a mix of both sides. Files whose content must not be mixed are ours.
+    /// CMAdapter::markResolved and CMAdapter::commit go on. git_merge_analysis, git_checkout_tree,
+    /// git_merge.
     /// @throws GitException with the message shared_vclink::git::MergeFailed, whose added text
     /// tells the cause, a cancellation and conflicts included
     virtual void merge(BranchName name) = 0;

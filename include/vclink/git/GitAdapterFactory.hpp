@@ -34,9 +34,10 @@ class VCLINK_GIT_EXPORT GitAdapterFactory : public vclink::CMAdapterFactory
     /// when it can't, or when a call to libgit2 fails. Lists of files are read alike: a file that
     /// lies outside the working copy, or that Git does not know, matches nothing; the characters
     /// '*', '?' and '[' in a name act as patterns; a symbolic link means its target, one that leads
-    /// nowhere itself; a folder means all below it. boost::filesystem::filesystem_error comes of a
-    /// path that can't be resolved. A path with a NUL character, also in the root, is refused with
-    /// GIT_EINVALIDSPEC before anything is opened.
+    /// nowhere itself; a folder means all below it, except the root, which matches nothing: name
+    /// what is in it, or use getFolderStates for states. boost::filesystem::filesystem_error comes
+    /// of a path that can't be resolved. A path with a NUL character, also in the root, is refused
+    /// with GIT_EINVALIDSPEC before anything is opened.
     ///
     /// What the adapter carries out:
     /// - getFileStates: the states of the files named, one walk for the whole list. A file that Git

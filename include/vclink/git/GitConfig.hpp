@@ -39,12 +39,13 @@ class VCLINK_GIT_EXPORT GitConfig
     std::optional<ustring> readDiffTool() const;
 
     /// Writes the command of the host's automatic merge tool, bin/lnxhost/vkAutoMerge.sh below the
-    /// host's place of installation, over whatever stands there. git_config_set_string.
-    /// @throws LibGit2Exception when the file can't be written; it is as it was then
+    /// host's place of installation, and replaces the value that is there. git_config_set_string.
+    /// @throws LibGit2Exception if the file cannot be written, or has several values for the key,
+    /// or an included one. It is as it was before then. The exception does not name the key.
     void writeAutoMergeDriver();
-    /// The same of bin/lnxhost/vkMerge.
+    /// Writes the command of bin/lnxhost/vkMerge, as writeAutoMergeDriver() does.
     void writeMergeTool();
-    /// The same of bin/lnxhost/vkDiff.
+    /// Writes the command of bin/lnxhost/vkDiff, as writeAutoMergeDriver() does.
     void writeDiffTool();
 
   private:

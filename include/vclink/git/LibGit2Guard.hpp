@@ -29,10 +29,9 @@ class GitMergeDriverLookup;
 /// is put into a static variable later, such as a std::unique_ptr that main fills, must be gone
 /// before main returns: the log may end before it.
 ///
-/// Guards may be made and destroyed on any thread. Making one raises std::bad_alloc, and what the
-/// host's log sinks raise of its diagnostic records; libgit2 is then as it was before. A sink that
-/// raises of the record of a guard's end ends the process, as anything does that a destructor
-/// raises.
+/// Guards may be made and destroyed on any thread. Making one writes no record, and may throw
+/// std::bad_alloc; libgit2 is then as it was before. If a log sink throws while a guard is
+/// destroyed, the process terminates: hosts set boost::log::core::set_exception_handler.
 class VCLINK_GIT_EXPORT LibGit2Guard
 {
   public:
