@@ -1,16 +1,19 @@
 # SPDX-License-Identifier: MIT
 # vclink_instrumentation: sanitizers, and what measures, as the presets choose them. Never exported.
+# vclink_linked_instrumentation: for what only links with them.
+add_library(vclink_linked_instrumentation INTERFACE)
 add_library(vclink_instrumentation INTERFACE)
+target_link_libraries(vclink_instrumentation INTERFACE vclink_linked_instrumentation)
 if(VCLINK_SANITIZE)
     list(JOIN VCLINK_SANITIZE "," sanitizers)
     target_compile_options(vclink_instrumentation INTERFACE
         -fsanitize=${sanitizers} -fno-sanitize-recover=all -fno-omit-frame-pointer)
-    target_link_options(vclink_instrumentation INTERFACE -fsanitize=${sanitizers})
+    target_link_options(vclink_linked_instrumentation INTERFACE -fsanitize=${sanitizers})
 endif()
 
 # What measures the tests instruments the library's objects, and nothing else.
 if(VCLINK_COVERAGE)
-    target_link_options(vclink_instrumentation INTERFACE --coverage)
+    target_link_options(vclink_linked_instrumentation INTERFACE --coverage)
 endif()
 
 function(vclink_measure target)

@@ -1,6 +1,6 @@
 # SPDX-License-Identifier: MIT
 # What every compiled target of this repository has in common.
-function(vclink_configure_target target)
+function(vclink_configure_language target)
     target_compile_features(${target} PUBLIC cxx_std_17)
     set_target_properties(${target} PROPERTIES
         CXX_EXTENSIONS OFF
@@ -8,22 +8,35 @@ function(vclink_configure_target target)
         C_VISIBILITY_PRESET hidden
         VISIBILITY_INLINES_HIDDEN ON
         POSITION_INDEPENDENT_CODE ON)
-    target_link_libraries(${target} PRIVATE
-        $<BUILD_INTERFACE:vclink_warnings> $<BUILD_INTERFACE:vclink_instrumentation>)
+    target_link_libraries(${target} PRIVATE $<BUILD_INTERFACE:vclink_warnings>)
 endfunction()
 
-# vclink_configure_test_target(TARGET): for tests and what helps them. VCLINK_TEST_OPTIONS follow the
-# options of everything else, so that a preset can spare tests an instrumentation or optimisation
-# that the library needs.
-set(VCLINK_TEST_OPTIONS "" CACHE STRING "Compiler options of tests, after those of everything")
-set(VCLINK_TEST_LINK_OPTIONS "" CACHE STRING "Linker options of test programs")
-add_library(vclink_test_options INTERFACE)
-target_compile_options(vclink_test_options INTERFACE ${VCLINK_TEST_OPTIONS})
-target_link_options(vclink_test_options INTERFACE ${VCLINK_TEST_LINK_OPTIONS})
-function(vclink_configure_test_target target)
-    vclink_configure_target(${target})
-    target_link_libraries(${target} PRIVATE vclink_test_options)
+function(vclink_configure_target target)
+    vclink_configure_language(${target})
+    target_link_libraries(${target} PRIVATE $<BUILD_INTERFACE:vclink_instrumentation>)
 endfunction()
+
+# Tests, and what helps them, compile with these flags in place of the configuration's and of the
+# sanitizers'. With the same flags in two presets the compiler cache serves both. The layers, the
+# stand-in and the programs keep what the preset gives them.
+set(VCLINK_TEST_FLAGS "" CACHE STRING "Compiler flags of tests; empty: those of everything else")
+
+function(vclink_configure_test_target target)
+    if(VCLINK_TEST_FLAGS)
+        vclink_configure_language(${target})
+        target_link_libraries(${target} PRIVATE vclink_linked_instrumentation)
+    else()
+        vclink_configure_target(${target})
+    endif()
+endfunction()
+
+# vclink_use_test_flags(): for a folder with nothing but tests, before its targets.
+macro(vclink_use_test_flags)
+    if(VCLINK_TEST_FLAGS)
+        string(TOUPPER "CMAKE_CXX_FLAGS_${CMAKE_BUILD_TYPE}" vclink_configuration_flags)
+        set(${vclink_configuration_flags} "${VCLINK_TEST_FLAGS}")
+    endif()
+endmacro()
 
 # Shared libraries and programs lie in the build tree as they do when installed, so that what is
 # found relative to them is found in both.

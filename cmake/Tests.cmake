@@ -68,7 +68,7 @@ endfunction()
 #
 # The objects come first on the link line: of an inline function that both have compiled, the linker
 # keeps the layers' one, with the layers' instrumentation and optimisation. Tests themselves may
-# have less of both (VCLINK_TEST_OPTIONS). tests/instrumentation holds this.
+# have less of both (VCLINK_TEST_FLAGS). tests/instrumentation holds this.
 set(VCLINK_RUN_LABELS "" CACHE STRING
     "Labels of the tests that can be run, all if empty; other tests only have to compile")
 

@@ -5,7 +5,7 @@
 #include <memory>
 
 #include "check.hpp"
-#include "instrumentation/planted.hpp"
+#include "instrumentation/planted/planted.hpp"
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t *data, std::size_t size)
 {

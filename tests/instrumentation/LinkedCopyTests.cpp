@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include <gtest/gtest.h>
 
-#include "instrumentation/planted.hpp"
+#include "instrumentation/planted/planted.hpp"
 
 namespace
 {

@@ -4,7 +4,7 @@
 
 #include <gtest/gtest.h>
 
-#include "instrumentation/planted.hpp"
+#include "instrumentation/planted/planted.hpp"
 
 namespace
 {

@@ -3,7 +3,7 @@
 
 #include <gtest/gtest.h>
 
-#include "instrumentation/planted.hpp"
+#include "instrumentation/planted/planted.hpp"
 
 namespace
 {

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-#include "instrumentation/planted.hpp"
+#include "instrumentation/planted/planted.hpp"
 
 namespace vclink::planted
 {
