@@ -142,9 +142,10 @@ TEST_F(BranchLists, SeeWhatChangedSinceTheManagerWasMade)
 TEST_F(BranchLists, OfManyBranchesAreWhole)
 {
     repository_.commitAll("first");
+    const std::string head = idOf("HEAD");
     std::string commands;
     for (int i = 0; i < 2000; ++i)
-        commands += "create refs/heads/b" + std::to_string(i) + ' ' + idOf("HEAD") + '\n';
+        commands += "create refs/heads/b" + std::to_string(i) + ' ' + head + '\n';
     ASSERT_TRUE(repository_.command({"update-ref", "--stdin"}).input(commands).run().succeeded());
     repository_.git({"pack-refs", "--all"});
     EXPECT_EQ(local(), byGit("refs/heads"));

@@ -241,9 +241,10 @@ TEST_P(RemoteHeads, LeaveNoDescriptorOpen)
 
 TEST_P(RemoteHeads, AreManyInOrder)
 {
+    const std::string head = idOf("HEAD", author_);
     std::ostringstream commands;
     for (int number = 0; number < 5000; ++number)
-        commands << "create refs/heads/many/" << number << ' ' << idOf("HEAD", author_) << '\n';
+        commands << "create refs/heads/many/" << number << ' ' << head << '\n';
     ASSERT_TRUE(server_.command({"update-ref", "--stdin"}).input(commands.str()).run().succeeded());
     server_.git({"pack-refs", "--all"});
     const auto found = heads();
