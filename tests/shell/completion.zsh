@@ -36,7 +36,7 @@ compadd()
 }
 tell() { zle -I; zle .kill-whole-line; print -r -- done >$HOME/told; }
 zle -N tell
-bindkey '^I' complete-word '^X' tell
+bindkey '^I' complete-word '^T' tell
 print -r -- ready >$HOME/told
 END
 
@@ -56,7 +56,7 @@ wait_until_told()
 offers()
 {
     rm -f $folder/offered
-    zpty -nw shell "$1"$'\t\x18'
+    zpty -nw shell "$1"$'\t\x14'
     wait_until_told
     reply=()
     [[ ! -e $folder/offered ]] || reply=("${(@f)$(<$folder/offered)}")
