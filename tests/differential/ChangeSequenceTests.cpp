@@ -20,7 +20,7 @@ namespace fs = std::filesystem;
 using vclink::test::ChangeSequence;
 
 constexpr std::uint64_t sequenceBlocks = 10;
-constexpr std::uint64_t sequencesInBlock = 30;
+constexpr std::uint64_t sequencesInBlock = 10;
 
 std::uint64_t numberFrom(const char *variable, std::uint64_t otherwise)
 {

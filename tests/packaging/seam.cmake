@@ -23,6 +23,9 @@ execute_process(
     COMMAND ${CMAKE_COMMAND} -G Ninja -S "${source}" -B "${build}"
         -D CMAKE_BUILD_TYPE=Debug
         -D "CMAKE_CXX_FLAGS_DEBUG=-O0 -g0"
+        -D CMAKE_UNITY_BUILD=ON
+        -D CMAKE_UNITY_BUILD_BATCH_SIZE=12
+        -D VCLINK_UNITY_LAYERS=ON
         -D "CMAKE_CXX_COMPILER=${COMPILER}"
         -D "CMAKE_PREFIX_PATH=${prefix}"
         -D VCLINK_HOST=package
