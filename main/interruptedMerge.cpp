@@ -34,11 +34,13 @@ namespace
 {
 
 /// Stages whatever stands where the merge may have written, so that new files are told from
-/// untracked ones, keeps it in the stash, and puts back what HEAD has. Everything else stays.
+/// untracked ones, keeps it in the stash if it is anything, and puts back what HEAD has. Everything
+/// else stays. Folders, in the places of files that are not written yet, would stop the staging.
 constexpr const char *wayOut =
     "To begin again, run in the root of the working copy: git diff-tree -r -z --name-only HEAD "
-    "MERGE_HEAD | git update-index -z --add --remove --stdin; git stash store $(git stash create); "
-    "git merge --abort";
+    "MERGE_HEAD | xargs -0 sh -c 'for f; do [ -d \"$f\" ] && [ ! -L \"$f\" ] || "
+    "printf \"%s\\0\" \"$f\"; done' sh | git update-index -z --add --remove --replace --stdin; "
+    "git stash create | xargs -r git stash store; git merge --abort";
 
 /// @throws LibGit2Exception if that can't be looked at
 bool exists(const std::string &path)

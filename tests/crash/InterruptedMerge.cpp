@@ -120,8 +120,9 @@ void InterruptedMerge::followWayOut()
 {
     const std::string wayOut = wayOutOf(refusal_);
     ASSERT_NE(wayOut, "") << refusal_;
-    const auto result = Command({"/bin/sh", "-c", wayOut}).in(repository_.path()).run();
-    EXPECT_TRUE(result.succeeded()) << wayOut << '\n' << result.errors;
+    const auto result = Command({"/bin/sh", "-ec", wayOut}).in(repository_.path()).run();
+    EXPECT_TRUE(result.succeeded()) << wayOut;
+    EXPECT_EQ(result.errors, "") << wayOut;
 }
 
 /// What only one side has changed is as that side has it, and what both have is as neither has it.

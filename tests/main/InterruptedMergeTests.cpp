@@ -109,8 +109,9 @@ class InterruptedMerge : public vclink::test::MergeTest
     void run(const std::string &commands) const
     {
         const auto result =
-            vclink::test::Command({"sh", "-c", commands}).in(repository_.path()).run();
-        EXPECT_TRUE(result.succeeded()) << commands << ": " << result.errors;
+            vclink::test::Command({"sh", "-ec", commands}).in(repository_.path()).run();
+        EXPECT_TRUE(result.succeeded()) << commands;
+        EXPECT_EQ(result.errors, "") << commands;
     }
 };
 
@@ -125,6 +126,9 @@ class KilledMerge : public InterruptedMerge, public testing::WithParamInterface<
         repository_.write("renamed", "one line\nand another\nand a third\n");
         repository_.write("untouched", "x");
         repository_.write("sub/tracked", "x");
+        repository_.write("becomes a file/a", "x");
+        repository_.write("becomes a file/b", "x");
+        repository_.write("becomes a folder", "x");
         repository_.write(".gitignore", "*.ignored\n");
         repository_.commitAll("more");
         diverge(
@@ -142,6 +146,11 @@ class KilledMerge : public InterruptedMerge, public testing::WithParamInterface<
                 repository_.write("new", std::string("\0binary\1", 8));
                 repository_.write("sub/new", "theirs\n");
                 repository_.write("fresh/new", "theirs\n");
+                repository_.remove("becomes a file");
+                repository_.write("becomes a file", "theirs\n");
+                repository_.remove("becomes a folder");
+                repository_.write("becomes a folder/a", "theirs\n");
+                repository_.write("becomes a folder/b", "theirs\n");
                 repository_.write("forced.ignored", "theirs\n");
                 repository_.git({"add", "--force", "forced.ignored"});
             });
@@ -180,6 +189,8 @@ TEST_P(KilledMerge, IsTakenBackByTheCommandsThatTheRefusalNames)
     EXPECT_EQ(parents(), (std::vector<std::string>{idOf("main^"), idOf("topic")}));
     EXPECT_EQ(repository_.read("both"), "ours\n2\n3\n4\n5\n6\ntheirs\n");
     EXPECT_EQ(repository_.read("sub/new"), "theirs\n");
+    EXPECT_EQ(repository_.read("becomes a file"), "theirs\n");
+    EXPECT_EQ(repository_.read("becomes a folder/b"), "theirs\n");
     EXPECT_THAT(repository_.read("of another name"), HasSubstr("of theirs"));
     EXPECT_FALSE(exists("deleted"));
     EXPECT_EQ(repository_.read("sub/untracked"), "mine");
@@ -206,7 +217,7 @@ TEST_P(KilledMerge, IsTakenBackWithoutWhatWasEditedSince)
     EXPECT_EQ(repository_.git({"show", "HEAD:fresh/new"}), "theirs\n");
 }
 
-INSTANTIATE_TEST_SUITE_P(AtCall, KilledMerge, testing::Values(1U, 2U, 4U, 6U, 8U, 10U));
+INSTANTIATE_TEST_SUITE_P(AtCall, KilledMerge, testing::Values(1U, 2U, 3U, 4U, 6U, 8U, 10U, 12U));
 
 TEST_F(InterruptedMerge, OfConflictsOnlyIsNotConcludedByACommit)
 {
