@@ -20,6 +20,7 @@
 #include "error/errorUtil/rethrowAsGitException.hpp"
 #include "error/logging/logger.hpp"
 #include "error/raise.hpp"
+#include "main/Head.hpp"
 #include "main/checkout/CheckoutWatch.hpp"
 #include "options/gitRecords.hpp"
 #include "util/IndexLock.hpp"
@@ -136,6 +137,7 @@ void BranchMerger::fastForward(git_repository *repository, git_annotated_commit 
         acquire<git_reference>(git_repository_head, repository).value();
     const git_oid *const id = git_annotated_commit_id(theirs);
     refuseMovedBranch(repository, head.get(), id);
+    const Head headThen(head.get());
     const OwnedHandle<git_object> target =
         acquire<git_object>(git_object_lookup, repository, id, GIT_OBJECT_COMMIT).value();
     CheckoutOptions options = optionsFactory_->makeCheckoutOptions();
@@ -144,6 +146,8 @@ void BranchMerger::fastForward(git_repository *repository, git_annotated_commit 
     CheckoutWatch watch(CheckoutKind::Switch, repository, record);
     watch.lookBeforeSwitch(target.get());
     awaitUnlocked(repository, git_reference_name(head.get()));
+    // As it was looked at: what comes later, libgit2 finds when it moves the branch.
+    headThen.refuseMoved(repository);
     makeResult(git_checkout_tree(repository, target.get(), &record)).value();
     lock.publish();
     // Only now, so that a checkout that fails leaves the branch where it was.

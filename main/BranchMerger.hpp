@@ -17,6 +17,7 @@ namespace vclink::git
 {
 
 class IndexLock;
+struct MergeSides;
 
 /// Carries out one merge. Made for it, and gone with it.
 class BranchMerger
@@ -47,7 +48,7 @@ class BranchMerger
     void decide(const BranchName &name, git_repository *repository);
     /// To be asked again once the index is locked: until then another process may begin something.
     static void refuseOtherStates(git_repository *repository);
-    void commitMerge(const BranchName &name, git_repository *repository);
+    void commitMerge(const BranchName &name, git_repository *repository, const MergeSides &sides);
     [[noreturn]] void endWithConflicts(git_repository *repository, git_index *index,
                                        const git_checkout_options &options, IndexLock &lock);
 

@@ -21,6 +21,7 @@ namespace vclink::git
 {
 
 class IndexLock;
+struct MergeSides;
 
 /// The back end of one working copy. Holds what it needs to open the repository and to build option
 /// records, and nothing of the repository itself. See GitAdapterFactory::createAdapterFor.
@@ -48,6 +49,9 @@ class GitAdapter : public vclink::CMAdapter
     std::shared_ptr<GitOptionsFactory> getOptionsFactory() const;
     GitCallbacks &getCallbacks() const;
     std::shared_ptr<ApplicationInteractor> getInteractor() const;
+    /// Lets commit() refuse to make any other commit than the one that concludes this merge.
+    /// @param sides outlive the commit; null for no merge
+    void expectMerge(const MergeSides *sides) noexcept;
 
   private:
     FileStateMap collectFileStates(char **pathspecStrings, std::size_t pathspecCount);
@@ -64,6 +68,8 @@ class GitAdapter : public vclink::CMAdapter
     std::shared_ptr<GitOptionsFactory> optionsFactory_;
     std::unique_ptr<GitCallbacks> callbacks_;
     std::shared_ptr<ApplicationInteractor> interactor_;
+    /// Null except while a merge commits.
+    const MergeSides *expectedMerge_ = nullptr;
 };
 
 } // namespace vclink::git

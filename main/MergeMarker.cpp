@@ -6,14 +6,11 @@
 #include <cstddef>
 
 #include <fcntl.h>
-#include <git2/annotated_commit.h>
 #include <git2/oid.h>
-#include <git2/refs.h>
 #include <git2/repository.h>
 #include <sys/stat.h>
 #include <unistd.h>
 
-#include "error/errorUtil/GitResult.hpp"
 #include "error/errorUtil/raiseSystemError.hpp"
 #include "util/FileDescriptor.hpp"
 
@@ -37,13 +34,6 @@ std::string lineOf(const git_oid &id)
     return line;
 }
 
-git_oid readHead(git_repository *repository)
-{
-    git_oid head{};
-    makeResult(git_reference_name_to_id(&head, repository, "HEAD")).value();
-    return head;
-}
-
 void writeMarker(const std::string &path, const std::string &text)
 {
     const FileDescriptor file(::open(path.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC,
@@ -58,15 +48,14 @@ void writeMarker(const std::string &path, const std::string &text)
 
 } // namespace
 
-MergeMarker::MergeMarker(git_repository *repository, const git_annotated_commit *theirs)
+MergeMarker::MergeMarker(git_repository *repository, const MergeSides &sides)
     : path_(markerPath(repository))
 {
-    const git_oid head = readHead(repository);
     removeMergeMarker(repository);
     // git's own sign of a merge that is whole. libgit2 leaves it when it ends one.
     const std::string autoMerge = git_repository_path(repository) + std::string("AUTO_MERGE");
     ::unlink(autoMerge.c_str());
-    writeMarker(path_, lineOf(head) + lineOf(*git_annotated_commit_id(theirs)));
+    writeMarker(path_, lineOf(sides.ours) + lineOf(sides.theirs));
 }
 
 MergeMarker::~MergeMarker()

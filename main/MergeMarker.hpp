@@ -5,7 +5,7 @@
 
 #include <git2/types.h>
 
-struct git_oid;
+#include "main/MergeSides.hpp"
 
 namespace vclink::git
 {
@@ -17,9 +17,9 @@ class MergeMarker
 {
   public:
     /// To be made while the index is locked and no merge is under way: what is left of an earlier
-    /// merge goes. git_reference_name_to_id.
+    /// merge goes.
     /// @throws LibGit2Exception if the file can't be written
-    MergeMarker(git_repository *repository, const git_annotated_commit *theirs);
+    MergeMarker(git_repository *repository, const MergeSides &sides);
     MergeMarker(const MergeMarker &) = delete;
     MergeMarker &operator=(const MergeMarker &) = delete;
     ~MergeMarker();

@@ -17,6 +17,7 @@
 #include "main/commitIdentity.hpp"
 #include "main/indexRefresh.hpp"
 #include "main/interruptedMerge.hpp"
+#include "main/mergeHead.hpp"
 #include "util/IndexLock.hpp"
 #include "util/referenceLocks.hpp"
 #include "util/repository.hpp"
@@ -90,6 +91,10 @@ void GitAdapter::commit(const upath & /*folder*/, const ustring &message)
             parents.push_back(mergeHead.get());
         }
     }
+    if (expectedMerge_ != nullptr)
+    {
+        refuseOtherParents(*expectedMerge_, parents);
+    }
     if (head.has_value() && mergeHeads.size() == 1)
     {
         refuseInterruptedMerge(repository.get(), parents.front(), parents.back());
@@ -99,6 +104,12 @@ void GitAdapter::commit(const upath & /*folder*/, const ustring &message)
         removeMergeMarker(repository.get());
     }
     createCommit(repository.get(), message, parents, lock);
+    expectMerge(nullptr);
+}
+
+void GitAdapter::expectMerge(const MergeSides *sides) noexcept
+{
+    expectedMerge_ = sides;
 }
 
 void GitAdapter::createCommit(git_repository *repository, const ustring &message,

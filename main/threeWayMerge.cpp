@@ -17,9 +17,11 @@
 #include "main/BranchMerger.hpp"
 #include "main/MergeMarker.hpp"
 #include "main/checkout/CheckoutWatch.hpp"
+#include "main/mergeHead.hpp"
 #include "options/gitRecords.hpp"
 #include "util/IndexLock.hpp"
 #include "util/PathspecArray.hpp"
+#include "util/ScopedCleanup.hpp"
 #include "util/pathspecEscape.hpp"
 #include "util/repository.hpp"
 #include "vclink/git/messageIdentifiers.hpp"
@@ -111,8 +113,10 @@ void BranchMerger::threeWayMerge(const BranchName &name, git_repository *reposit
     refuseOtherStates(repository);
     CheckoutWatch watch(CheckoutKind::Merge, repository, checkoutRecord);
     watch.lookBeforeMerge(git_annotated_commit_id(theirs));
-    marker.emplace(repository, theirs);
+    const MergeSides sides{readHeadId(repository), *git_annotated_commit_id(theirs)};
+    marker.emplace(repository, sides);
     makeResult(git_merge(repository, heads, 1, &mergeRecord, &checkoutRecord)).value();
+    restoreMergeHead(repository, sides.theirs);
     const OwnedHandle<git_index> index = getRepositoryIndex(repository);
     if (git_index_has_conflicts(index.get()) != 0)
     {
@@ -122,14 +126,17 @@ void BranchMerger::threeWayMerge(const BranchName &name, git_repository *reposit
     marker.reset();
     // The commit takes it again, for a repository of its own.
     lock.release();
-    commitMerge(name, repository);
+    commitMerge(name, repository, sides);
 }
 
-void BranchMerger::commitMerge(const BranchName &name, git_repository *repository)
+void BranchMerger::commitMerge(const BranchName &name, git_repository *repository,
+                               const MergeSides &sides)
 {
     const bool isReference =
         acquire<git_reference>(git_reference_dwim, repository, asGitString(name)).has_value();
     const std::string message = (isReference ? "Merge branch '" : "Merge commit '") + name + "'";
+    adapter_.expectMerge(&sides);
+    const ScopedCleanup over([this] { adapter_.expectMerge(nullptr); });
     vclink::CMAdapter &adapter = adapter_;
     adapter.commit(upath(), fl::i18n::utf8_to_ustring(message));
 }

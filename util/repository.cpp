@@ -140,6 +140,13 @@ const git_oid *revparseId(const std::string &spec, git_repository *repository)
     return &copy;
 }
 
+git_oid readHeadId(git_repository *repository)
+{
+    git_oid id{};
+    makeResult(git_reference_name_to_id(&id, repository, "HEAD")).value();
+    return id;
+}
+
 GitResult<OwnedHandle<git_commit>> lookupCommitByName(const char *name, git_repository *repository)
 {
     const auto reference = acquire<git_reference>(git_reference_dwim, repository, name);

@@ -53,6 +53,9 @@ GitResult<OwnedHandle<git_object>> revparseObject(git_repository *repository,
 /// @return the calling thread's copy, good until the next call on the thread
 const git_oid *revparseId(const std::string &spec, git_repository *repository);
 
+/// The id of HEAD's commit. git_reference_name_to_id. Raises.
+git_oid readHeadId(git_repository *repository);
+
 /// The commit of a reference, by any name that git_reference_dwim takes. git_reference_dwim,
 /// git_reference_target, git_commit_lookup. Keeps a failure.
 GitResult<OwnedHandle<git_commit>> lookupCommitByName(const char *name, git_repository *repository);

@@ -3,6 +3,7 @@
 
 #include <array>
 #include <cstddef>
+#include <utility>
 
 #include <fcntl.h>
 #include <git2.h>
@@ -100,11 +101,16 @@ int setConflict(const Obstacle &obstacle)
     return GIT_ECONFLICT;
 }
 
+int codeFor(const Finding &finding)
+{
+    return finding ? setConflict(*finding) : 0;
+}
+
 } // namespace
 
 CheckoutWatch::CheckoutWatch(CheckoutKind kind, git_repository *repository,
                              git_checkout_options &record)
-    : kind_(kind), repository_(repository),
+    : kind_(kind), repository_(repository), record_(record),
       isForced_((record.checkout_strategy & GIT_CHECKOUT_FORCE) != 0), first_(record.notify_cb),
       firstPayload_(record.notify_payload)
 {
@@ -116,9 +122,20 @@ CheckoutWatch::CheckoutWatch(CheckoutKind kind, git_repository *repository,
     record.file_open_flags = O_CREAT | O_TRUNC | O_WRONLY | O_NOFOLLOW | O_NONBLOCK;
 }
 
-void CheckoutWatch::lookBeforeSwitch(const git_object *target)
+WorkingCopy &CheckoutWatch::lookAtWorkingCopy()
 {
     WorkingCopy &copy = copy_.emplace(repository_);
+    // Else libgit2 reads HEAD once more. Without an index it has to: that is a first checkout.
+    if (standingAt(git_index_path(copy.index())) != Standing::Nothing)
+    {
+        record_.baseline = copy.head();
+    }
+    return copy;
+}
+
+void CheckoutWatch::lookBeforeSwitch(const git_object *target)
+{
+    WorkingCopy &copy = lookAtWorkingCopy();
     const OwnedHandle<git_object> peeled =
         acquire<git_object>(git_object_peel, target, GIT_OBJECT_TREE).value();
     const OwnedHandle<git_tree> tree = lookupTree(repository_, git_object_id(peeled.get()));
@@ -141,9 +158,8 @@ void CheckoutWatch::lookBeforeSwitch(const git_object *target)
 
 void CheckoutWatch::lookBeforeMerge(const git_oid *theirs)
 {
-    WorkingCopy &copy = copy_.emplace(repository_);
-    git_oid ours{};
-    makeResult(git_reference_name_to_id(&ours, repository_, "HEAD")).value();
+    WorkingCopy &copy = lookAtWorkingCopy();
+    const git_oid ours = readHeadId(repository_);
     const OwnedHandle<git_tree> after = treeOf(repository_, theirs);
     const MergeBases bases(repository_, &ours, theirs);
     Finding first = findHiddenEdit(copy);
@@ -201,22 +217,29 @@ int CheckoutWatch::hear(const CheckoutNotice &notice)
     {
         return 0;
     }
-    const Finding found = kind_ == CheckoutKind::Revert ? clearAll(notice) : judge(notice);
-    return found ? setConflict(*found) : 0;
+    if (kind_ == CheckoutKind::Revert)
+    {
+        return codeFor(clearAll(notice));
+    }
+    if (!copy_)
+    {
+        return 0;
+    }
+    // A merge's commands may have run for minutes since the look before.
+    if (!std::exchange(hasHeard_, true))
+    {
+        copy_->forgetWays();
+        if (copy_->hasHeadMoved())
+        {
+            git_error_set_str(GIT_ERROR_REFERENCE, Head::movedText);
+            return GIT_EMODIFIED;
+        }
+    }
+    return codeFor(judge(notice));
 }
 
 Finding CheckoutWatch::judge(const CheckoutNotice &notice)
 {
-    if (!copy_)
-    {
-        return {};
-    }
-    if (!hasHeard_)
-    {
-        // A merge's commands may have run for minutes since the look before.
-        copy_->forgetWays();
-        hasHeard_ = true;
-    }
     Finding found = kind_ == CheckoutKind::Merge ? ask(mergeNoticeRules, *copy_, notice)
                                                  : ask(switchNoticeRules, *copy_, notice);
     if (!found)

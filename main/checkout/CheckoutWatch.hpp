@@ -33,13 +33,18 @@ enum class CheckoutKind
 /// names the first file; nothing is written then. A revert clears the way, as git does: it replaces
 /// the links, FIFOs, sockets and devices that are in it.
 ///
+/// A switch and a merge are also refused, with GIT_EMODIFIED, if HEAD has moved since the look
+/// before. If it moves after that, what is written is still what HEAD then was, so that files of
+/// the new commit are not deleted.
+///
 /// The record's own notification is asked first, so that a cancellation comes before a refusal; it
 /// is told of what is refused as of any other conflict.
 class CheckoutWatch
 {
   public:
     /// @param repository outlives the watch
-    /// @param record its notification is taken over; goes into the checkout while the watch lives
+    /// @param record outlives the watch; its notification is taken over, and its baseline set by
+    /// the look before
     CheckoutWatch(CheckoutKind kind, git_repository *repository, git_checkout_options &record);
     CheckoutWatch(const CheckoutWatch &) = delete;
     CheckoutWatch &operator=(const CheckoutWatch &) = delete;
@@ -59,11 +64,13 @@ class CheckoutWatch
     int hear(const CheckoutNotice &notice);
     Finding judge(const CheckoutNotice &notice);
     void makeWay(const CheckoutNotice &notice);
+    WorkingCopy &lookAtWorkingCopy();
     Finding clearAll(const CheckoutNotice &notice);
     void refuse(const Obstacle &obstacle);
 
     CheckoutKind kind_;
     git_repository *repository_;
+    git_checkout_options &record_;
     bool isForced_;
     git_checkout_notify_cb first_;
     void *firstPayload_;

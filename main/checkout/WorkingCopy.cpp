@@ -25,16 +25,10 @@ struct FreeTreeEntry
     }
 };
 
-OwnedHandle<git_tree> lookupHeadTree(git_repository *repository)
+OwnedHandle<git_tree> headTreeOf(git_repository *repository, const git_reference *head)
 {
-    auto head = acquire<git_reference>(git_repository_head, repository);
-    if (head.has_error() && head.error().getCode() == GIT_EUNBORNBRANCH)
-    {
-        return nullptr;
-    }
-    const OwnedHandle<git_reference> reference = std::move(head).value();
     const OwnedHandle<git_object> object =
-        acquire<git_object>(git_reference_peel, reference.get(), GIT_OBJECT_TREE).value();
+        acquire<git_object>(git_reference_peel, head, GIT_OBJECT_TREE).value();
     return lookupTree(repository, git_object_id(object.get()));
 }
 
@@ -47,9 +41,19 @@ std::string workdirOf(git_repository *repository)
 } // namespace
 
 WorkingCopy::WorkingCopy(git_repository *repository)
-    : repository_(repository), root_(workdirOf(repository)), index_(getRepositoryIndex(repository)),
-      head_(lookupHeadTree(repository))
+    : repository_(repository), root_(workdirOf(repository)), index_(getRepositoryIndex(repository))
 {
+    const OwnedHandle<git_reference> head = lookupHead(repository);
+    if (head != nullptr)
+    {
+        headThen_ = Head(head.get());
+        head_ = headTreeOf(repository, head.get());
+    }
+}
+
+bool WorkingCopy::hasHeadMoved() const
+{
+    return headThen_.hasMoved(repository_);
 }
 
 Standing WorkingCopy::at(const std::string &name)

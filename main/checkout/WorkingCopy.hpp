@@ -9,6 +9,7 @@
 #include <git2/types.h>
 
 #include "error/errorUtil/GitDeleters.hpp"
+#include "main/Head.hpp"
 #include "main/checkout/standing.hpp"
 
 namespace vclink::git
@@ -24,10 +25,12 @@ class WorkingCopy
     explicit WorkingCopy(git_repository *repository);
 
     /// HEAD's tree, null on an unborn branch.
-    const git_tree *head() const noexcept
+    git_tree *head() const noexcept
     {
         return head_.get();
     }
+    /// Whether HEAD is no longer what it was then.
+    bool hasHeadMoved() const;
     git_index *index() const noexcept
     {
         return index_.get();
@@ -71,6 +74,7 @@ class WorkingCopy
     git_repository *repository_;
     std::string root_;
     OwnedHandle<git_index> index_;
+    Head headThen_;
     OwnedHandle<git_tree> head_;
     const Way wayToRoot_{};
     std::unordered_map<std::string, Way> ways_;

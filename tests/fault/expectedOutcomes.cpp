@@ -88,15 +88,11 @@ std::string missed(const std::string &file)
                    "could not read '" + file + "', which is tracked: Input/output error");
 }
 
-std::string otherTip(const std::string &operation)
-{
-    return failureIn(operation, GIT_EMODIFIED, GIT_ERROR_OBJECT,
-                     "failed to create commit: current tip is not the first parent");
-}
-
 std::vector<Tolerance> tolerancesOfCommits(const std::string &operation, const std::string &normal)
 {
-    const std::string isOtherTip = otherTip(operation);
+    const std::string isOtherTip =
+        failureIn(operation, GIT_EMODIFIED, GIT_ERROR_OBJECT,
+                  "failed to create commit: current tip is not the first parent");
     return {
         // A HEAD that can't be read makes the commit a first one, which libgit2 refuses.
         {"commitFirst", "git_reference_dwim", any, any, normal},
@@ -133,7 +129,10 @@ std::vector<Tolerance> tolerancesOfCommits(const std::string &operation, const s
 
 std::vector<Tolerance> tolerancesOfOthers(const std::string &operation, const std::string &normal)
 {
-    const std::string isOtherTip = otherTip(operation);
+    const std::string isOtherMerge =
+        failureIn(operation, GIT_EMODIFIED, GIT_ERROR_MERGE,
+                  "the merge was not committed, because another process has moved the current "
+                  "branch or ended the merge meanwhile: see git status");
     const std::string hasConflicts = mergeFailure(textOf(shared_vclink::git::HasConflicts()));
     const std::string badState =
         mergeFailure(textOf(shared_vclink::git::UnableToMergeBadRepositoryState()));
@@ -157,7 +156,7 @@ std::vector<Tolerance> tolerancesOfOthers(const std::string &operation, const st
         // Any state but the normal one refuses the merge, any answer but no means conflicts.
         {"merge", "git_repository_state", 1, any, badState},
         {"merge", "git_repository_state", 2, any, badState},
-        {"merge", "git_repository_state", 3, any, normal},
+        {"merge", "git_repository_state", 3, any, isOtherMerge},
         // The index has what only the other side has changed, from wherever both began.
         {"merge", "git_merge_base", any, GIT_ENOTFOUND, normal},
         // The library ends the comparison itself as soon as it has seen something of that.
@@ -168,8 +167,8 @@ std::vector<Tolerance> tolerancesOfOthers(const std::string &operation, const st
         // The first look-up chooses the words of the message, the second is the commit's, after
         // those of the look before the merge.
         {"merge", "git_reference_dwim", 1, any, normal},
-        {"merge", "git_reference_dwim", 2, any, isOtherTip},
-        {"merge", "git_commit_lookup", 3, any, isOtherTip},
+        {"merge", "git_reference_dwim", 2, any, isOtherMerge},
+        {"merge", "git_commit_lookup", 3, any, isOtherMerge},
         // Without its command a driver leaves the file to libgit2's own merge.
         {"mergeByTool", "git_config_get_entry", any, any, hasConflicts},
         // No value is what the reads of the configuration make of every failure.

@@ -49,7 +49,7 @@ class BranchCallsTest : public MergeTest
         const void *const callbacks = &adapter_->getCallbacks().checkoutCallbacks();
         EXPECT_EQ(record.progress_payload, callbacks);
         EXPECT_EQ(record.perfdata_payload, callbacks);
-        EXPECT_EQ(record.baseline, nullptr);
+        EXPECT_NE(record.baseline, nullptr) << "the tree that was looked at";
         EXPECT_EQ(record.target_directory, nullptr);
         EXPECT_EQ(record.disable_filters, 0);
         EXPECT_EQ(record.file_open_flags, O_CREAT | O_TRUNC | O_WRONLY | O_NOFOLLOW | O_NONBLOCK);

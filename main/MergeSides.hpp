@@ -1,0 +1,16 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <git2/oid.h>
+
+namespace vclink::git
+{
+
+/// The two commits of a merge: HEAD's when it began, and the one that is merged into it.
+struct MergeSides
+{
+    git_oid ours;
+    git_oid theirs;
+};
+
+} // namespace vclink::git
