@@ -20,8 +20,10 @@ endfunction()
 # sanitizers'. With the same flags in two presets the compiler cache serves both. The layers, the
 # stand-in and the programs keep what the preset gives them.
 set(VCLINK_TEST_FLAGS "" CACHE STRING "Compiler flags of tests; empty: those of everything else")
+set(VCLINK_TEST_LINK_OPTIONS "" CACHE STRING "Linker options of tests, besides those of everything")
 
 function(vclink_configure_test_target target)
+    target_link_options(${target} PRIVATE ${VCLINK_TEST_LINK_OPTIONS})
     if(VCLINK_TEST_FLAGS)
         vclink_configure_language(${target})
         target_link_libraries(${target} PRIVATE vclink_linked_instrumentation)
