@@ -109,12 +109,12 @@ void BasicBranchManager::switchBranch(const BranchName &name)
     CheckoutWatch watch(CheckoutKind::Switch, repository.get(), record);
     watch.lookBeforeSwitch(target.get());
     awaitUnlocked(repository.get(), "HEAD");
-    makeResult(git_checkout_tree(repository.get(), target.get(), &record)).value();
+    call(git_checkout_tree, repository.get(), target.get(), &record).value();
     lock.publish();
     // Only now, so that a checkout that fails leaves HEAD where it was.
     const char *const head = git_reference_name(branch.get());
     retryWhileLocked(repository.get(),
-                     [&] { return makeResult(git_repository_set_head(repository.get(), head)); })
+                     [&] { return call(git_repository_set_head, repository.get(), head); })
         .value();
 }
 
@@ -150,7 +150,7 @@ void BasicBranchManager::deleteBranch(const BranchName &name)
             repository = adapter_.getRepository();
         }
         const OwnedHandle<git_reference> branch = lookupLocalBranch(repository.get(), shortName);
-        return makeResult(git_branch_delete(branch.get()));
+        return call(git_branch_delete, branch.get());
     };
     retryWhileLocked(repository.get(), deleteOnce).value();
 }
@@ -161,7 +161,7 @@ BranchPointer BasicBranchManager::getCurrentBranch() const
     const OwnedHandle<git_reference> head =
         acquire<git_reference>(git_repository_head, repository.get()).value();
     const char *name = nullptr;
-    makeResult(git_branch_name(&name, head.get())).value();
+    call(git_branch_name, &name, head.get()).value();
     return BranchPointer(name);
 }
 

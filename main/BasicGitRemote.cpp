@@ -58,8 +58,9 @@ std::vector<GitRemoteHead> listHeads(git_remote *remote)
 {
     const git_remote_head **heads = nullptr;
     std::size_t count = 0;
+    const GitResult<void> listed = call(git_remote_ls, &heads, &count, remote);
     // Asked of a success too, which is meant: every listing leaves a record in the log.
-    GitErrorPolicy::throwIfError(GitError(git_remote_ls(&heads, &count, remote)));
+    GitErrorPolicy::throwIfError(listed.has_error() ? listed.error() : GitError());
     return copyHeads(heads, count);
 }
 
@@ -82,7 +83,7 @@ void BasicGitRemote::fetch(const std::vector<ustring> &refspecs)
     const OwnedHandle<git_remote> remote = lookupRemote(repository.get(), name);
     const FetchOptions options = optionsFactory_->makeFetchOptions();
     const git_fetch_options record = toGitFetchOptions(options, *callbacks_);
-    makeResult(git_remote_fetch(remote.get(), getArrayPointer(array), &record, nullptr)).value();
+    call(git_remote_fetch, remote.get(), getArrayPointer(array), &record, nullptr).value();
 }
 
 void BasicGitRemote::push(const std::vector<ustring> &refspecs)
@@ -94,7 +95,7 @@ void BasicGitRemote::push(const std::vector<ustring> &refspecs)
     const OwnedHandle<git_remote> remote = lookupRemote(repository.get(), name);
     const PushOptions options = optionsFactory_->makePushOptions();
     const git_push_options record = toGitPushOptions(options, *callbacks_);
-    makeResult(git_remote_push(remote.get(), getArrayPointer(array), &record)).value();
+    call(git_remote_push, remote.get(), getArrayPointer(array), &record).value();
 }
 
 std::vector<GitRemoteHead> BasicGitRemote::getRemoteHeads() const
@@ -106,7 +107,7 @@ std::vector<GitRemoteHead> BasicGitRemote::getRemoteHeads() const
     const ProxyOptions options = optionsFactory_->makeProxyOptions();
     const git_remote_callbacks callbacks = toGitRemoteCallbacks(callbacks_->remoteCallbacks());
     const git_proxy_options proxy = toGitProxyOptions(options, callbacks_->proxyCallbacks());
-    makeResult(git_remote_connect(remote.get(), GIT_DIRECTION_FETCH, &callbacks, &proxy, nullptr))
+    call(git_remote_connect, remote.get(), GIT_DIRECTION_FETCH, &callbacks, &proxy, nullptr)
         .value();
     return listHeads(remote.get());
 }

@@ -51,15 +51,16 @@ std::string nameBits(unsigned bits, std::initializer_list<std::pair<unsigned, co
 void refuseMovedBranch(git_repository *repository, const git_reference *head, const git_oid *target)
 {
     const git_oid *const current = git_reference_target(head);
-    const int isAhead = git_graph_descendant_of(repository, target, current);
-    if (isAhead == 0)
+    const GitResult<void> ahead = call(git_graph_descendant_of, repository, target, current);
+    if (ahead.has_value())
     {
         raiseGitError(GIT_EMODIFIED, GIT_ERROR_MERGE,
                       "the current branch has moved since the merge began");
     }
-    if (isAhead < 0)
+    // 1 says that it is ahead.
+    if (ahead.error().getCode() < 0)
     {
-        makeResult(isAhead).value();
+        ahead.value();
     }
 }
 
@@ -148,7 +149,7 @@ void BranchMerger::fastForward(git_repository *repository, git_annotated_commit 
     awaitUnlocked(repository, git_reference_name(head.get()));
     // As it was looked at: what comes later, libgit2 finds when it moves the branch.
     headThen.refuseMoved(repository);
-    makeResult(git_checkout_tree(repository, target.get(), &record)).value();
+    call(git_checkout_tree, repository, target.get(), &record).value();
     lock.publish();
     // Only now, so that a checkout that fails leaves the branch where it was.
     retryWhileLocked(

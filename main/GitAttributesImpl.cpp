@@ -41,7 +41,7 @@ GitAttributesImpl::GitAttributesImpl(GitAdapter &adapter) : adapter_(adapter)
 {
     const OwnedHandle<git_repository> repository = adapter_.getRepository();
     // Dropped, which is meant: no query depends on it.
-    static_cast<void>(makeResult(git_attr_cache_flush(repository.get())));
+    static_cast<void>(call(git_attr_cache_flush, repository.get()));
 }
 
 GitAttributesImpl::~GitAttributesImpl() = default;
@@ -52,8 +52,8 @@ GitAttribute GitAttributesImpl::getAttribute(const upath &path, const ustring &n
     const std::string attribute = toGitString(name);
     const OwnedHandle<git_repository> repository = adapter_.getRepository();
     const char *value = nullptr;
-    makeResult(git_attr_get(&value, repository.get(), GIT_ATTR_CHECK_FILE_THEN_INDEX, file.c_str(),
-                            attribute.c_str()))
+    call(git_attr_get, &value, repository.get(), GIT_ATTR_CHECK_FILE_THEN_INDEX, file.c_str(),
+         attribute.c_str())
         .value();
     return {name, classify(value)};
 }

@@ -43,7 +43,7 @@ int collectMergeHead(const git_oid *id, void *payload) noexcept
 std::vector<OwnedHandle<git_commit>> lookupMergeHeads(git_repository *repository)
 {
     std::vector<git_oid> ids;
-    makeResult(git_repository_mergehead_foreach(repository, collectMergeHead, &ids)).value();
+    call(git_repository_mergehead_foreach, repository, collectMergeHead, &ids).value();
     std::vector<OwnedHandle<git_commit>> commits;
     commits.reserve(ids.size());
     for (const git_oid &id : ids)
@@ -132,10 +132,9 @@ void GitAdapter::createCommit(git_repository *repository, const ustring &message
     retryWhileLocked(repository,
                      [&]
                      {
-                         return makeResult(
-                             git_commit_create(&id, repository, "HEAD", signature.get(),
-                                               signature.get(), "UTF-8", text.c_str(), tree.get(),
-                                               parentPointers.size(), parentPointers.data()));
+                         return call(git_commit_create, &id, repository, "HEAD", signature.get(),
+                                     signature.get(), "UTF-8", text.c_str(), tree.get(),
+                                     parentPointers.size(), parentPointers.data());
                      })
         .value();
     const GitResult<OwnedHandle<git_object>> written = lookUpWritten(repository, id);

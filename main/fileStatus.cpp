@@ -55,9 +55,8 @@ FileStateMap GitAdapter::collectFileStates(char **pathspecStrings, std::size_t p
     record.pathspec = {pathspecStrings, pathspecCount};
     const OwnedHandle<git_repository> repository = openRepository(root_);
     // Dropped, which is meant: the caller gets the states up to where the walk failed.
-    static_cast<void>(makeResult(git_status_foreach_ext(
-        repository.get(), &record, makeCallback<&StatusCallbacks::status, git_status_cb>(),
-        &callbacks)));
+    static_cast<void>(call(git_status_foreach_ext, repository.get(), &record,
+                           makeCallback<&StatusCallbacks::status, git_status_cb>(), &callbacks));
     return std::move(callbacks.states);
 }
 

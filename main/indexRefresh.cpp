@@ -24,7 +24,7 @@ namespace
 bool isIndexed(git_index *index, const char *path)
 {
     std::size_t position = 0;
-    const GitResult<void> found = makeResult(git_index_find(&position, index, path));
+    const GitResult<void> found = call(git_index_find, &position, index, path);
     if (found.has_error() && found.error().getCode() == GIT_ENOTFOUND)
     {
         return false;
@@ -101,7 +101,7 @@ void restoreDropped(git_repository *repository, git_index *index, git_index *bef
         }
         if ((entry->flags_extended & GIT_INDEX_ENTRY_SKIP_WORKTREE) != 0)
         {
-            makeResult(git_index_add(index, entry)).value();
+            call(git_index_add, index, entry).value();
         }
         else
         {
@@ -115,7 +115,7 @@ void restoreDropped(git_repository *repository, git_index *index, git_index *bef
 void refreshIndex(git_repository *repository, git_index *index)
 {
     const std::size_t countBefore = git_index_entrycount(index);
-    makeResult(git_index_update_all(index, nullptr, nullptr, nullptr)).value();
+    call(git_index_update_all, index, nullptr, nullptr, nullptr).value();
     if (git_index_entrycount(index) < countBefore)
     {
         const OwnedHandle<git_index> before = openIndex(git_index_path(index));

@@ -82,7 +82,7 @@ OwnedHandle<git_tree> findBase(git_repository *repository, const git_commit *our
 {
     git_oid id{};
     const GitResult<void> found =
-        makeResult(git_merge_base(&id, repository, git_commit_id(ours), git_commit_id(theirs)));
+        call(git_merge_base, &id, repository, git_commit_id(ours), git_commit_id(theirs));
     if (found.has_error() && found.error().getCode() == GIT_ENOTFOUND)
     {
         return nullptr;
@@ -106,7 +106,7 @@ struct File
 File findInTree(const git_tree *tree, const char *path)
 {
     git_tree_entry *raw = nullptr;
-    const GitResult<void> found = makeResult(git_tree_entry_bypath(&raw, tree, path));
+    const GitResult<void> found = call(git_tree_entry_bypath, &raw, tree, path);
     const std::unique_ptr<git_tree_entry, void (*)(git_tree_entry *)> entry(raw,
                                                                             git_tree_entry_free);
     if (found.has_error() && found.error().getCode() == GIT_ENOTFOUND)
@@ -165,12 +165,12 @@ bool isNothingTaken(git_repository *repository, const git_commit *ours, const gi
     const OwnedHandle<git_index> index = getRepositoryIndex(repository);
     Search search{oursTree.get(), index.get()};
     git_diff_options options{};
-    makeResult(git_diff_options_init(&options, GIT_DIFF_OPTIONS_VERSION)).value();
+    call(git_diff_options_init, &options, GIT_DIFF_OPTIONS_VERSION).value();
     options.notify_cb = lookAt;
     options.payload = &search;
     git_diff *raw = nullptr;
     const GitResult<void> compared =
-        makeResult(git_diff_tree_to_tree(&raw, repository, base.get(), theirsTree.get(), &options));
+        call(git_diff_tree_to_tree, &raw, repository, base.get(), theirsTree.get(), &options);
     const std::unique_ptr<git_diff, void (*)(git_diff *)> diff(raw, git_diff_free);
     if (search.isTaken)
     {

@@ -59,7 +59,7 @@ std::vector<ustring> listUnmergeable(git_repository *repository, git_index *inde
         const git_index_entry *ours = nullptr;
         const git_index_entry *theirs = nullptr;
         const GitResult<void> next =
-            makeResult(git_index_conflict_next(&ancestor, &ours, &theirs, iterator.get()));
+            call(git_index_conflict_next, &ancestor, &ours, &theirs, iterator.get());
         if (next.has_error() && next.error().getCode() == GIT_ITEROVER)
         {
             return paths;
@@ -115,7 +115,7 @@ void BranchMerger::threeWayMerge(const BranchName &name, git_repository *reposit
     watch.lookBeforeMerge(git_annotated_commit_id(theirs));
     const MergeSides sides{readHeadId(repository), *git_annotated_commit_id(theirs)};
     marker.emplace(repository, sides);
-    makeResult(git_merge(repository, heads, 1, &mergeRecord, &checkoutRecord)).value();
+    call(git_merge, repository, heads, 1, &mergeRecord, &checkoutRecord).value();
     restoreMergeHead(repository, sides.theirs);
     const OwnedHandle<git_index> index = getRepositoryIndex(repository);
     if (git_index_has_conflicts(index.get()) != 0)
@@ -151,7 +151,7 @@ void BranchMerger::endWithConflicts(git_repository *repository, git_index *index
         const PathspecArray pathspec = makeStringPathspec(makeExactPatterns(paths));
         copy.paths = getArray(pathspec);
         copy.checkout_strategy |= GIT_CHECKOUT_USE_OURS;
-        makeResult(git_checkout_index(repository, nullptr, &copy)).value();
+        call(git_checkout_index, repository, nullptr, &copy).value();
     }
     lock.publish();
     raise(shared_vclink::git::HasConflicts());

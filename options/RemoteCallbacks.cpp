@@ -5,6 +5,7 @@
 
 #include <git2/errors.h>
 
+#include "error/errorUtil/setGitError.hpp"
 #include "error/logging/logger.hpp"
 
 namespace vclink::git
@@ -34,6 +35,9 @@ int RemoteCallbacks::credentials(git_credential **out, const char *url, const ch
 {
     writeRecord(SeverityParameter, " url=", url, " username_from_url=", usernameFromUrl,
                 " allowed_types=", allowedTypes);
+    // libgit2 sets no text of its own where this fails: one that it left on its way here, such as
+    // of a setting that is not set, would be shown as the reason.
+    git_error_clear();
     if ((allowedTypes & GIT_CREDENTIAL_SSH_KEY) != 0)
     {
         return git_credential_ssh_key_from_agent(out, usernameFromUrl);

@@ -38,7 +38,7 @@ milliseconds readReferenceLockTimeout(git_repository *repository)
     const auto config = acquire<git_config>(git_repository_config_snapshot, repository);
     std::int64_t value = 0;
     if (config.has_error() ||
-        makeResult(git_config_get_int64(&value, config.value().get(), "core.filesRefLockTimeout"))
+        call(git_config_get_int64, &value, config.value().get(), "core.filesRefLockTimeout")
             .has_error())
     {
         return defaultTimeout;
@@ -58,11 +58,11 @@ void awaitUnlocked(git_repository *repository, const char *reference)
         [=]() -> GitResult<void>
         {
             git_transaction *raw = nullptr;
-            const auto made = makeResult(git_transaction_new(&raw, repository));
+            const auto made = call(git_transaction_new, &raw, repository);
             // Gives the lock up again.
             const std::unique_ptr<git_transaction, void (*)(git_transaction *)> transaction(
                 raw, git_transaction_free);
-            return made.has_error() ? made : makeResult(git_transaction_lock_ref(raw, reference));
+            return made.has_error() ? made : call(git_transaction_lock_ref, raw, reference);
         })
         .value();
 }

@@ -27,7 +27,7 @@ void readAgainIfEmpty(git_index *index)
     struct stat status = {};
     if (::stat(path, &status) == 0)
     {
-        makeResult(git_index_read(index, 1)).value();
+        call(git_index_read, index, 1).value();
     }
     else if (errno != ENOENT)
     {
@@ -56,8 +56,8 @@ bool hasMergeHead(git_repository *repository)
 bool isRepository(const upath &path)
 {
     const std::string folder = toGitString(path.string());
-    const GitResult<void> probe = makeResult(
-        git_repository_open_ext(nullptr, folder.c_str(), GIT_REPOSITORY_OPEN_NO_SEARCH, nullptr));
+    const GitResult<void> probe = call(git_repository_open_ext, nullptr, folder.c_str(),
+                                       GIT_REPOSITORY_OPEN_NO_SEARCH, nullptr);
     if (probe.has_error() && probe.error().getCode() == GIT_ENOTFOUND)
     {
         return false;
@@ -85,11 +85,11 @@ int readRepositoryState(git_repository *repository)
 
 void cleanUpRepositoryState(git_repository *repository)
 {
-    makeResult(git_repository_state_cleanup(repository)).value();
+    call(git_repository_state_cleanup, repository).value();
     // The next commit would be one of the same merge.
     if (hasMergeHead(repository))
     {
-        makeResult(git_repository_state_cleanup(repository)).value();
+        call(git_repository_state_cleanup, repository).value();
     }
 }
 
@@ -109,13 +109,13 @@ OwnedHandle<git_index> openIndex(const char *path)
 
 void writeIndex(git_index *index)
 {
-    makeResult(git_index_write(index)).value();
+    call(git_index_write, index).value();
 }
 
 git_oid writeIndexTree(git_index *index)
 {
     git_oid id{};
-    makeResult(git_index_write_tree(&id, index)).value();
+    call(git_index_write_tree, &id, index).value();
     return id;
 }
 
@@ -143,7 +143,7 @@ const git_oid *revparseId(const std::string &spec, git_repository *repository)
 git_oid readHeadId(git_repository *repository)
 {
     git_oid id{};
-    makeResult(git_reference_name_to_id(&id, repository, "HEAD")).value();
+    call(git_reference_name_to_id, &id, repository, "HEAD").value();
     return id;
 }
 

@@ -5,6 +5,7 @@
 
 #include "error/errorUtil/GitDeleters.hpp"
 #include "error/errorUtil/GitErrorPolicy.hpp"
+#include "error/errorUtil/setGitError.hpp"
 #include "vclink/git/GitError.hpp"
 
 namespace vclink::git
@@ -15,7 +16,8 @@ namespace vclink::git
 template <class T> using GitResult = boost::outcome_v2::basic_result<T, GitError, GitErrorPolicy>;
 
 /// The result of a libgit2 call that gives nothing but its code. To be called with the call itself
-/// as the argument, so that nothing comes between the two.
+/// as the argument, so that nothing comes between the two. call() is for all functions that can
+/// leave a text.
 /// @throws std::bad_alloc
 inline GitResult<void> makeResult(int code)
 {
@@ -26,14 +28,26 @@ inline GitResult<void> makeResult(int code)
     return boost::outcome_v2::success();
 }
 
-/// Calls a libgit2 function whose first argument is the address of a handle, and owns the handle
-/// from then on. On a failure the error is read before a handle that libgit2 left is released,
+/// Calls a libgit2 function that gives nothing but its code. libgit2 fails without a text in places,
+/// and leaves a text where it goes on from a failure of its own. Its record is emptied before the
+/// call, so that the error never has the text of an earlier one.
+/// @throws std::bad_alloc
+template <class Function, class... Arguments>
+GitResult<void> call(Function function, Arguments... arguments)
+{
+    git_error_clear();
+    return makeResult(function(arguments...));
+}
+
+/// As call(), for a function whose first argument is the address of a handle; owns the handle from
+/// then on. On a failure the error is read before a handle that libgit2 left is released,
 /// since the release may replace libgit2's error record.
 /// @throws std::bad_alloc
 template <class Handle, class Function, class... Arguments>
 GitResult<OwnedHandle<Handle>> acquire(Function function, Arguments... arguments)
 {
     Handle *raw = nullptr;
+    git_error_clear();
     const int code = function(&raw, arguments...);
     OwnedHandle<Handle> handle(raw);
     if (code != 0)

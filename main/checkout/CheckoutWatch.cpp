@@ -54,8 +54,7 @@ class MergeBases
         // So that what a failing call has left is released.
         : MergeBases()
     {
-        const GitResult<void> found =
-            makeResult(git_merge_bases(&array_, repository, ours, theirs));
+        const GitResult<void> found = call(git_merge_bases, &array_, repository, ours, theirs);
         if (!found.has_error() || found.error().getCode() != GIT_ENOTFOUND)
         {
             found.value();

@@ -149,7 +149,7 @@ std::string WorkingCopy::foreignBelow(const std::string &folder) const
 bool WorkingCopy::isIgnored(const std::string &name) const
 {
     int ignored = 0;
-    makeResult(git_ignore_path_is_ignored(&ignored, repository_, name.c_str())).value();
+    call(git_ignore_path_is_ignored, &ignored, repository_, name.c_str()).value();
     return ignored != 0;
 }
 
@@ -177,12 +177,11 @@ git_oid WorkingCopy::idOf(const std::string &name, Standing standing) const
     if (standing == Standing::Link)
     {
         const std::string target = readLink(path);
-        makeResult(git_odb_hash(&id, target.data(), target.size(), GIT_OBJECT_BLOB)).value();
+        call(git_odb_hash, &id, target.data(), target.size(), GIT_OBJECT_BLOB).value();
     }
     else
     {
-        makeResult(
-            git_repository_hashfile(&id, repository_, path.c_str(), GIT_OBJECT_BLOB, name.c_str()))
+        call(git_repository_hashfile, &id, repository_, path.c_str(), GIT_OBJECT_BLOB, name.c_str())
             .value();
     }
     return id;
@@ -196,8 +195,7 @@ git_object_t WorkingCopy::typeInHead(const std::string &name) const
         return GIT_OBJECT_INVALID;
     }
     git_tree_entry *raw = nullptr;
-    const GitResult<void> found =
-        makeResult(git_tree_entry_bypath(&raw, head_.get(), name.c_str()));
+    const GitResult<void> found = call(git_tree_entry_bypath, &raw, head_.get(), name.c_str());
     const std::unique_ptr<git_tree_entry, FreeTreeEntry> entry(raw);
     if (found.has_error() && found.error().getCode() == GIT_ENOTFOUND)
     {

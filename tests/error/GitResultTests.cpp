@@ -117,6 +117,34 @@ TEST(GitResult, OfASuccessHoldsADefaultMadeError)
 #endif
 }
 
+int answerWith(int code, const char *text)
+{
+    if (text != nullptr)
+    {
+        git_error_set_str(GIT_ERROR_NET, text);
+    }
+    return code;
+}
+
+TEST(GitResult, OfACallHasItsOwnTextAndNoEarlierOne)
+{
+    const HermeticLibGit2 libgit2;
+    const char *const none = nullptr;
+    git_error_set_str(GIT_ERROR_CONFIG, "stale");
+    EXPECT_TRUE(call(answerWith, 0, none).has_value());
+    EXPECT_EQ(git_error_last(), nullptr);
+    git_error_set_str(GIT_ERROR_CONFIG, "stale");
+    const GitResult<void> silent = call(answerWith, -5, none);
+    ASSERT_TRUE(silent.has_error());
+    EXPECT_EQ(silent.error().getCode(), -5);
+    EXPECT_EQ(silent.error().getErrorClass(), 0);
+    EXPECT_EQ(silent.error().getMessage(), ustring());
+    const GitResult<void> told = call(answerWith, -6, "reason");
+    ASSERT_TRUE(told.has_error());
+    EXPECT_EQ(told.error().getErrorClass(), GIT_ERROR_NET);
+    EXPECT_EQ(told.error().getMessage(), u"reason");
+}
+
 TEST(GitResult, OfAFailureRaisesItWhenAskedForItsValue)
 {
     const HermeticLibGit2 libgit2;

@@ -118,6 +118,22 @@ TEST_F(Acquire, HoldsTheErrorOfAFailureWithoutAHandle)
     EXPECT_THAT(releasedStores, IsEmpty());
 }
 
+/// As libgit2 does in places.
+int failWithoutAText(git_odb ** /*out*/)
+{
+    return GIT_ERROR;
+}
+
+TEST_F(Acquire, HasNoTextOfAnEarlierCall)
+{
+    git_error_set_str(GIT_ERROR_CONFIG, "text of an earlier call");
+    const GitResult<OwnedHandle<git_odb>> result = acquire<git_odb>(failWithoutAText);
+    ASSERT_TRUE(result.has_error());
+    EXPECT_EQ(result.error().getCode(), GIT_ERROR);
+    EXPECT_EQ(result.error().getErrorClass(), 0);
+    EXPECT_EQ(result.error().getMessage(), ustring());
+}
+
 TEST_F(Acquire, ReleasesHandlesInReverseOrderWhenAnExceptionPasses)
 {
     const std::string path = libgit2.folder().path();

@@ -15,6 +15,7 @@
 #include <gtest/gtest.h>
 
 #include "error/CoreFilter.hpp"
+#include "error/HermeticLibGit2.hpp"
 #include "error/logging/severity.hpp"
 #include "support/LogCapture.hpp"
 #include "support/TestInteractor.hpp"
@@ -92,6 +93,8 @@ class RemoteCallbacksTest : public testing::Test
         }
     }
 
+    // The members are called by libgit2 alone.
+    test::HermeticLibGit2 libgit2_;
     test::TestInteractor interactor_;
     RemoteCallbacks callbacks_{interactor_};
 };

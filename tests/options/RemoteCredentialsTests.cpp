@@ -2,6 +2,7 @@
 #include <functional>
 #include <memory>
 #include <string>
+#include <vector>
 
 #include <git2.h>
 #include <git2/sys/credential.h>
@@ -15,6 +16,7 @@
 #include "options/gitRecords.hpp"
 #include "support/LogCapture.hpp"
 #include "support/TestInteractor.hpp"
+#include "support/libgit2/LibGit2Recorder.hpp"
 
 namespace vclink::git
 {
@@ -130,6 +132,33 @@ TEST_F(RemoteCredentials, TellTheirRequestInOneRecord)
                             " url=https://host/\xC3\xBC username_from_url= "
                             "allowed_types=4294967293"));
     EXPECT_EQ(log.records().front().severity, unsigned{SeverityParameter});
+}
+
+TEST_F(RemoteCredentials, TellTheirRequestBeforeTheyAskTheAgent)
+{
+    const LogCapture log;
+    std::vector<std::string> told;
+    test::LibGit2Recorder calls;
+    calls.on<git_credential_ssh_key_from_agent>([&](git_credential **, const char *)
+                                                { told = log.messages(); });
+    expectAgent(ask("ssh://git@host/path", "git", sshKey), "git");
+    EXPECT_THAT(told, ElementsAre(" url=ssh://git@host/path username_from_url=git "
+                                  "allowed_types=2"));
+}
+
+/// libgit2 looks for some settings on its way to the credentials, and takes what it has left for
+/// the reason of a refusal.
+TEST_F(RemoteCredentials, ThatAreRefusedLeaveNoTextOfAnEarlierCall)
+{
+    for (const unsigned types : {0u, 1u, 32u})
+    {
+        git_error_set_str(GIT_ERROR_CONFIG, "config value 'http.followRedirects' was not found");
+        EXPECT_EQ(ask("https://host/path", "git", types).code, -1);
+        EXPECT_EQ(git_error_last(), nullptr) << types;
+    }
+    git_error_set_str(GIT_ERROR_CONFIG, "config value 'http.followRedirects' was not found");
+    expectAgent(ask("ssh://git@host/path", "git", sshKey), "git");
+    EXPECT_EQ(git_error_last(), nullptr);
 }
 
 TEST_F(RemoteCredentials, TellTheirRequestWithoutAUrlOrAUser)

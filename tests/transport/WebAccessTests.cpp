@@ -69,11 +69,32 @@ TEST_P(WebPassword, IsAskedForInVain)
     const auto failure = vclink::test::failureOf([&] { clone(url, "clone"); });
     std::cout << "ends with " << testing::PrintToString(failure) << '\n';
     EXPECT_EQ(failure.code, GIT_ERROR);
+    EXPECT_EQ(failure.message, "");
     EXPECT_FALSE(std::filesystem::exists(folder() / "clone"));
     const std::string request = " url=" + url + " username_from_url= allowed_types=1";
     const auto messages = log.messages();
     EXPECT_EQ(std::count(messages.begin(), messages.end(), request), 1)
         << "GIT_CREDENTIAL_USERPASS_PLAINTEXT alone, once";
+}
+
+/// libgit2 gives no reason; what it has left on its way, of settings that are not set, is none.
+TEST_P(WebPassword, AskedForInVainLeavesNoTextOfAnEarlierCall)
+{
+    auto source = makeRepository("pushing");
+    source.commit("second");
+    source.git({"remote", "add", "origin", server().urlAt(GetParam(), served_)});
+    for (int round = 0; round < 2; ++round)
+    {
+        for (const auto &failure :
+             {vclink::test::failureOf([&] { push(source, {"HEAD:refs/heads/other"}); }),
+              vclink::test::failureOf([&] { fetch(source); }),
+              vclink::test::failureOf([&] { heads(source); })})
+        {
+            EXPECT_EQ(failure.code, GIT_ERROR);
+            EXPECT_EQ(failure.errorClass, 0);
+            EXPECT_EQ(failure.message, "");
+        }
+    }
 }
 
 TEST_P(WebPassword, InTheAddressIsTakenByLibgit2Itself)

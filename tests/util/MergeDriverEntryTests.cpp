@@ -214,13 +214,13 @@ TEST_F(MergeDriverEntry, CallsLibGit2InThisOrder)
     };
     const Answer answer = apply();
     EXPECT_EQ(answer.code, 0);
-    ASSERT_GE(names_.size(), 6U);
-    names_.resize(6);
+    ASSERT_GE(names_.size(), 7U);
+    names_.resize(7);
     EXPECT_THAT(names_,
                 ElementsAre("git_merge_driver_source_ancestor", "git_merge_driver_source_ours",
                             "git_merge_driver_source_theirs",
                             "git_merge_driver_source_file_options", "git_merge_driver_source_repo",
-                            "git_repository_config_snapshot"));
+                            "git_error_clear", "git_repository_config_snapshot"));
     EXPECT_THAT(steps_, ElementsAre("git_repository_config_snapshot", "git_config_get_entry",
                                     "git_repository_odb", "git_odb_read", "git_odb_object_free",
                                     "git_odb_free", "git_repository_odb", "git_odb_read",

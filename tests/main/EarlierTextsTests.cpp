@@ -1,0 +1,181 @@
+// SPDX-License-Identifier: MIT
+// libgit2 fails without a text in places, and leaves a text where it goes on from a failure of its
+// own: the one is never shown for the other.
+#include <functional>
+#include <memory>
+#include <string>
+#include <utility>
+#include <vector>
+
+#include <git2.h>
+#include <gtest/gtest.h>
+
+#include "RemoteTest.hpp"
+#include "error/errorUtil/setGitError.hpp"
+#include "support/libgit2/LibGit2Recorder.hpp"
+#include "support/text.hpp"
+#include "vclink/git/GitAdapterFactory.hpp"
+#include "vclink/git/GitAttribute.hpp"
+#include "vclink/git/GitAttributes.hpp"
+#include "vclink/git/GitConfig.hpp"
+#include "vclink/git/GitException.hpp"
+#include "vclink/git/GitWorkingCopyGenerator.hpp"
+
+namespace
+{
+
+namespace git = vclink::git;
+using vclink::test::asPath;
+using vclink::test::asUtf16;
+using vclink::test::asUtf8;
+using vclink::test::LibGit2Failure;
+using vclink::test::libGit2FailureOf;
+using vclink::test::LibGit2Recorder;
+
+/// A function that fails without a text, and an operation that it stops.
+struct Silence
+{
+    const char *function;
+    std::function<void()> begin;
+    std::function<void()> operation;
+};
+
+class EarlierTexts : public vclink::test::RemoteTest
+{
+  protected:
+    EarlierTexts()
+    {
+        commit("file", "one\n");
+        repository_.git({"branch", "topic"});
+        repository_.git({"branch", "other"});
+        repository_.git({"checkout", "--quiet", "topic"});
+        commit("of topic", "x");
+        repository_.git({"checkout", "--quiet", "main"});
+        commit("of main", "x");
+    }
+
+    template <auto Function> Silence silent(const char *name, std::function<void()> operation)
+    {
+        return {name,
+                [this]
+                {
+                    calls_.answer<Function>(
+                        [](auto...)
+                        {
+                            // Nothing has been left since the last call.
+                            EXPECT_EQ(git_error_last(), nullptr);
+                            return GIT_ERROR;
+                        });
+                },
+                std::move(operation)};
+    }
+    std::vector<Silence> silencesOfFiles();
+    std::vector<Silence> silencesOfBranches();
+    std::vector<Silence> silencesOfRemotes();
+
+    upath pathOf(const std::string &name) const
+    {
+        return asPath(repository_.path().string() + '/' + name);
+    }
+    void expectNoText(const std::vector<Silence> &silences)
+    {
+        for (const auto &silence : silences)
+        {
+            silence.begin();
+            git_error_set_str(GIT_ERROR_CONFIG, "text of an earlier call");
+            EXPECT_EQ(libGit2FailureOf(silence.operation), (LibGit2Failure{GIT_ERROR, 0, ""}))
+                << silence.function;
+        }
+    }
+
+    LibGit2Recorder calls_;
+};
+
+std::vector<Silence> EarlierTexts::silencesOfFiles()
+{
+    const auto revert = [this] { adapter_->revertFiles({pathOf("file")}); };
+    const auto commit = [this] { adapter_->commit(upath(), u"message"); };
+    return {silent<git_checkout_index>("git_checkout_index", revert),
+            silent<git_reset_default>("git_reset_default", revert),
+            silent<git_commit_create>("git_commit_create", commit),
+            silent<git_index_write_tree>("git_index_write_tree", commit),
+            silent<git_index_remove_all>("git_index_remove_all",
+                                         [this] { adapter_->removeFiles({pathOf("file")}); }),
+            silent<git_index_add_all>("git_index_add_all",
+                                      [this] { adapter_->markResolved(pathOf("file")); })};
+}
+
+std::vector<Silence> EarlierTexts::silencesOfBranches()
+{
+    const auto toTopic = [this] { branches().switchBranch("topic"); };
+    return {silent<git_repository_set_head>("git_repository_set_head", toTopic),
+            silent<git_checkout_tree>("git_checkout_tree", toTopic),
+            silent<git_branch_lookup>("git_branch_lookup", toTopic),
+            silent<git_branch_create>("git_branch_create",
+                                      [this] {
+                                          branches().createBranch({"fresh", "main"});
+                                      }),
+            silent<git_branch_name>("git_branch_name", [this] { branches().getCurrentBranch(); }),
+            silent<git_branch_next>("git_branch_next", [this] { branches().getLocalBranches(); }),
+            silent<git_revparse_single>("git_revparse_single",
+                                        [this] { branches().getRevision("main"); })};
+}
+
+std::vector<Silence> EarlierTexts::silencesOfRemotes()
+{
+    return {silent<git_remote_fetch>("git_remote_fetch", [this] { fetch(); }),
+            silent<git_remote_push>("git_remote_push", [this] { push({"refs/heads/main"}); }),
+            silent<git_remote_ls>("git_remote_ls", [this] { remote().getRemoteHeads(); }),
+            silent<git_remote_connect>("git_remote_connect", [this] { remote().getRemoteHeads(); }),
+            silent<git_clone>("git_clone",
+                              [this]
+                              {
+                                  git::GitWorkingCopyGenerator(interactor_)
+                                      .generate(asUtf16(nameOf(server_)),
+                                                asPath(folder() / "clone"));
+                              }),
+            silent<git_config_set_string>("git_config_set_string",
+                                          [] { git::GitConfig().writeMergeTool(); }),
+            silent<git_attr_get>(
+                "git_attr_get", [this]
+                { git::GitAttributes::create(*adapter_)->getAttribute(asPath("file"), u"text"); }),
+            silent<git_repository_open_ext>(
+                "git_repository_open_ext",
+                [this] { git::GitAdapterFactory().isAdapterFor(asPath(repository_.path())); })};
+}
+
+TEST_F(EarlierTexts, AreNotThoseOfFailuresOfFiles)
+{
+    expectNoText(silencesOfFiles());
+}
+
+TEST_F(EarlierTexts, AreNotThoseOfFailuresOfBranches)
+{
+    expectNoText(silencesOfBranches());
+}
+
+TEST_F(EarlierTexts, AreNotThoseOfFailuresOfRemotes)
+{
+    expectNoText(silencesOfRemotes());
+}
+
+TEST_F(EarlierTexts, AreNotThoseOfAMergeThatFails)
+{
+    calls_.answer<git_merge>([](auto...) { return GIT_ERROR; });
+    git_error_set_str(GIT_ERROR_CONFIG, "text of an earlier call");
+    try
+    {
+        branches().merge("topic");
+        FAIL() << "no exception";
+    }
+    catch (const git::GitException &exception)
+    {
+        EXPECT_EQ(asUtf8(exception.GetUnicodeMessageTxt()).find("text of an earlier call"),
+                  std::string::npos);
+        EXPECT_NE(asUtf8(exception.GetUnicodeMessageTxt())
+                      .find(vclink::test::textOf(LibGit2Failure{GIT_ERROR, 0, ""})),
+                  std::string::npos);
+    }
+}
+
+} // namespace
