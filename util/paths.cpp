@@ -25,11 +25,50 @@ bool isName(std::string_view element)
     return !element.empty() && element != "." && element != "..";
 }
 
+bool hasWorkingFolder()
+{
+    boost::system::error_code error;
+    fs::current_path(error);
+    return !error;
+}
+
+/// What boost::filesystem::weakly_canonical gives of an absolute path.
+fs::path resolveFromRoot(const fs::path &path)
+{
+    fs::path existing = path;
+    fs::path missing;
+    while (existing.has_relative_path() && !fs::exists(existing))
+    {
+        missing = missing.empty() ? existing.filename() : existing.filename() / missing;
+        existing = existing.parent_path();
+    }
+    existing = fs::canonical(existing, existing.root_path());
+    return missing.empty() ? existing : (existing / missing).lexically_normal();
+}
+
+/// Boost asks for the working folder even if the path is absolute, and fails if that folder is
+/// gone.
+fs::path weaklyCanonical(const fs::path &path)
+{
+    try
+    {
+        return fs::weakly_canonical(path);
+    }
+    catch (const fs::filesystem_error &)
+    {
+        if (!path.is_absolute() || hasWorkingFolder())
+        {
+            throw;
+        }
+    }
+    return resolveFromRoot(path);
+}
+
 /// A separator at the end is kept by Boost 1.81. Boost 1.74 leaves it out where the path exists,
 /// and puts "." behind it elsewhere: so it is here with every release.
 fs::path canonical(const fs::path &path)
 {
-    fs::path result = fs::weakly_canonical(path);
+    fs::path result = weaklyCanonical(path);
     const std::string &text = result.native();
     if (text.size() < 2 || text.back() != '/')
     {

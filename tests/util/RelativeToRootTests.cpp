@@ -11,6 +11,7 @@
 #include <gtest/gtest.h>
 
 #include "support/GitTest.hpp"
+#include "support/WorkingFolder.hpp"
 #include "support/text.hpp"
 #include "util/paths.hpp"
 
@@ -224,6 +225,44 @@ TEST_F(RelativeToRoot, AgreesWithItsDefinitionOnRandomPaths)
             EXPECT_EQ(list.relative(asPath(at(path))), oracle(at(root), at(path)))
                 << root << " and " << path;
         }
+    }
+}
+
+/// The working folder of a process may be deleted, which is nothing to an absolute path.
+TEST_F(RelativeToRoot, NeedsNoWorkingFolderForAbsolutePaths)
+{
+    const std::vector<std::string> paths{"root",
+                                         "root/",
+                                         "root/.",
+                                         "root/file",
+                                         "root/sub/dir/file",
+                                         "root/sub/missing/deep",
+                                         "root/missing/",
+                                         "root/missing/../file",
+                                         "root/missing/./x/..",
+                                         "root/file/below",
+                                         "root/out/file",
+                                         "root/tofolder/missing",
+                                         "root/tofile",
+                                         "root/dangling",
+                                         "root/danglingbelow/x",
+                                         "root/x\\y",
+                                         "nowhere/at/all",
+                                         "other/roundabout/file"};
+    for (const std::string root : {"root", "link", "root/sub", "root/missing", "nowhere/"})
+    {
+        std::vector<std::string> expected;
+        for (const std::string &path : paths)
+            expected.push_back(relative(root, path));
+        const vclink::test::NoWorkingFolder gone(folder().path());
+        for (std::size_t i = 0; i < paths.size(); ++i)
+            EXPECT_EQ(relative(root, paths[i]), expected[i]) << root << " and " << paths[i];
+        EXPECT_THROW(relative(root, "root/loop"), boost::filesystem::filesystem_error);
+        EXPECT_THROW(relative(root, "root/" + std::string(300, 'n')),
+                     boost::filesystem::filesystem_error);
+        EXPECT_EQ(asUtf8(relativeToRoot(asPath("/"), asPath("/missing"))), "missing");
+        EXPECT_THROW(relativeToRoot(asPath(at(root)), asPath(".")),
+                     boost::filesystem::filesystem_error);
     }
 }
 
