@@ -1,9 +1,11 @@
 // SPDX-License-Identifier: MIT
 #include <algorithm>
+#include <cstddef>
 #include <memory>
 #include <string>
 
 #include <git2/checkout.h>
+#include <git2/errors.h>
 #include <git2/index.h>
 #include <git2/reset.h>
 
@@ -57,18 +59,39 @@ bool areIndexed(git_index *index, const std::vector<std::string> &names)
                        { return git_index_get_bypath(index, name.c_str(), 0) != nullptr; });
 }
 
+/// A file that is put back takes what was staged below its name out of the index. libgit2 then goes
+/// on to take these entries out as well, which it can't, and gives up in the midst of the list:
+/// what is done by then need not be done again.
+bool isHalfDone(const GitResult<void> &reset)
+{
+    return reset.has_error() && reset.error().getCode() == GIT_ENOTFOUND &&
+           reset.error().getErrorClass() == GIT_ERROR_INDEX;
+}
+
+/// @param files how many may be put back at most
+void resetToHead(git_repository *repository, const git_object *head, const PathspecArray &pathspec,
+                 std::size_t files)
+{
+    GitResult<void> reset = call(git_reset_default, repository, head, getArrayPointer(pathspec));
+    for (; isHalfDone(reset) && files > 0; --files)
+    {
+        reset = call(git_reset_default, repository, head, getArrayPointer(pathspec));
+    }
+    reset.value();
+}
+
 void resetEntries(git_repository *repository, const git_object *head, const PathspecArray &pathspec,
                   const std::vector<std::string> &names)
 {
     // The one that the resets and the checkout work on. Left to them, it would be empty where
     // libgit2 can't look at the file, and hold nothing but these entries afterwards.
     const OwnedHandle<git_index> index = getRepositoryIndex(repository);
-    makeResult(git_reset_default(repository, head, getArrayPointer(pathspec))).value();
+    resetToHead(repository, head, pathspec, names.size());
     // A file whose kind was changed in the index, to a link or from one, is taken out of it by the
     // first reset, and put back by the second.
     if (head != nullptr && !areIndexed(index.get(), names))
     {
-        makeResult(git_reset_default(repository, head, getArrayPointer(pathspec))).value();
+        resetToHead(repository, head, pathspec, names.size());
     }
 }
 
@@ -113,7 +136,7 @@ void GitAdapter::revertFiles(const std::vector<upath> &files)
     git_checkout_options record = toGitCheckoutOptions(options, callbacks_->checkoutCallbacks());
     record.paths = getArray(pathspec);
     const CheckoutWatch watch(CheckoutKind::Revert, repository.get(), record);
-    makeResult(git_checkout_index(repository.get(), nullptr, &record)).value();
+    call(git_checkout_index, repository.get(), nullptr, &record).value();
     lock.publish();
 }
 

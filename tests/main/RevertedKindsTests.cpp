@@ -1,5 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include <filesystem>
+#include <string>
+#include <vector>
 
 #include <boost/filesystem/exception.hpp>
 #include <gmock/gmock.h>
@@ -103,6 +105,41 @@ TEST_F(RevertedKinds, MakesAFileAgainOfAFolder)
     repository_.remove("file");
     repository_.write("file/inside", "x");
     expectRevertsAsGit({"file"});
+}
+
+TEST_F(RevertedKinds, MakesALinkAgainOfAStagedFolder)
+{
+    for (const std::string target : {"file", "sub", "nowhere"})
+    {
+        repository_.symlink(target, "link");
+        repository_.commitAll("link to " + target);
+        repository_.remove("link");
+        repository_.write("link/a", "x");
+        repository_.write("link/deep/b", "x");
+        repository_.add({"."});
+        repository_.write("link/untracked", "x");
+        expectRevertsAsGit({"link"});
+        EXPECT_THAT(status(), ElementsAre());
+        EXPECT_EQ(fs::read_symlink(repository_ / "link"), target);
+        repository_.remove("link");
+    }
+}
+
+TEST_F(RevertedKinds, MakesFilesAndLinksAgainOfStagedFolders)
+{
+    const std::vector<std::string> names{"a first", "file", "link", "other", "sub/inside"};
+    repository_.write("a first", "x");
+    repository_.symlink("file", "link");
+    repository_.commitAll("second");
+    for (const std::string &name : names)
+    {
+        repository_.remove(name);
+        repository_.write(name + "/a", "x");
+        repository_.write(name + "/b", "x");
+    }
+    repository_.add({"."});
+    expectRevertsAsGit(names);
+    EXPECT_THAT(status(), ElementsAre());
 }
 
 TEST_F(RevertedKinds, TakesAStagedChangeOfAFileToALinkBack)
