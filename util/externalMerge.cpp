@@ -10,8 +10,10 @@
 
 #include <git2/buffer.h>
 #include <git2/errors.h>
+#include <sys/stat.h>
 
 #include "error/errorUtil/GitResult.hpp"
+#include "error/errorUtil/raiseGitError.hpp"
 #include "error/logging/logger.hpp"
 #include "fl/filesystem/fstream.hpp"
 #include "fl/i18n/convert.hpp"
@@ -58,9 +60,22 @@ class SideFile
     ScopedCleanup cleanup_;
 };
 
+/// A link could lead to any file of the user's, which the commit would then hold.
+void refuseLink(const upath &file)
+{
+    const std::string name = fl::i18n::ustring_to_utf8(file.string());
+    struct stat status = {};
+    if (::lstat(name.c_str(), &status) == 0 && S_ISLNK(status.st_mode))
+    {
+        raiseGitError(GIT_ERROR, GIT_ERROR_MERGE,
+                      "a symbolic link is in the place of the merged file '" + name + "'");
+    }
+}
+
 /// An unreadable file counts as an empty one, which is meant.
 std::vector<char> readFile(const upath &file)
 {
+    refuseLink(file);
     fl::filesystem::basic_ifstream<char> stream(file.string(),
                                                 std::ios_base::in | std::ios_base::binary);
     return std::vector<char>(std::istreambuf_iterator<char>(stream),
@@ -105,7 +120,7 @@ int runExternalMerge(const std::string &command, const MergeSides &sides,
     }
     writeRecord(SeverityDiagnostic, "Auto-merge successful");
     const std::vector<char> result = readFile(ours.path());
-    makeResult(git_buf_set(merged.content, result.data(), result.size())).value();
+    call(git_buf_set, merged.content, result.data(), result.size()).value();
     // Only now: a driver that fails leaves these as they were.
     *merged.path = sides.resultPath();
     *merged.mode = sides.resultMode();

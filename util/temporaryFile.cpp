@@ -1,8 +1,13 @@
 // SPDX-License-Identifier: MIT
 #include "util/temporaryFile.hpp"
 
+#include <cerrno>
+#include <string>
+
+#include <fcntl.h>
 #include <git2/odb.h>
 #include <git2/repository.h>
+#include <sys/stat.h>
 
 #include "error/errorUtil/GitResult.hpp"
 #include "error/errorUtil/diagnosticText.hpp"
@@ -11,6 +16,7 @@
 #include "fl/filesystem/fstream.hpp"
 #include "fl/filesystem/operations.hpp"
 #include "fl/i18n/convert.hpp"
+#include "util/FileDescriptor.hpp"
 #include "util/ScopedCleanup.hpp"
 
 namespace vclink::git
@@ -19,11 +25,32 @@ namespace vclink::git
 namespace
 {
 
+/// Whether there is a file to write to. A host's tmpnam may have made it already; where it gives
+/// nothing but a name, the file is made here, for nobody but its owner. A link that somebody has
+/// put there, or anything else, is left alone.
+bool isThere(const ustring &name)
+{
+    const std::string native = fl::i18n::ustring_to_utf8(name);
+    struct stat status = {};
+    if (::lstat(native.c_str(), &status) == 0)
+    {
+        return S_ISREG(status.st_mode);
+    }
+    constexpr int flags = O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC;
+    return errno == ENOENT &&
+           FileDescriptor(::open(native.c_str(), flags, S_IRUSR | S_IWUSR)).get() >= 0;
+}
+
 void writeFile(const upath &file, const void *data, std::size_t size)
 {
-    fl::filesystem::basic_ofstream<char> stream(
-        fl::filesystem::detail::make_native_access_form(file.string()),
-        std::ios_base::out | std::ios_base::binary);
+    const ustring name = fl::filesystem::detail::make_native_access_form(file.string());
+    if (!isThere(name))
+    {
+        return;
+    }
+    // A file that has gone since then is not made again.
+    fl::filesystem::basic_ofstream<char> stream(name, std::ios_base::in | std::ios_base::out |
+                                                          std::ios_base::binary);
     // The state of the stream is not looked at, which is meant: the command then meets what is
     // there.
     stream.write(static_cast<const char *>(data), static_cast<std::streamsize>(size));

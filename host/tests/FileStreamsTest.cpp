@@ -87,6 +87,21 @@ TEST(FileStreams, FailWithoutRaisingWhenAFileCannotBeOpened)
     EXPECT_TRUE(out.fail());
 }
 
+TEST(FileStreams, MakeNoFileWhenTheyAreToUpdateOne)
+{
+    const TemporaryFolder folder;
+    const auto update = binaryOut | std::ios_base::in;
+    EXPECT_FALSE(basic_ofstream<char>(folder.ufile("missing"), update).is_open());
+    EXPECT_FALSE(basic_ifstream<char>(folder.ufile("missing"), binaryIn).is_open());
+    writeFile(folder.file("data"), "12345");
+    basic_ofstream<char> out(folder.ufile("data"), update);
+    ASSERT_TRUE(out.is_open());
+    out << "abc";
+    out.close();
+    EXPECT_TRUE(out.good());
+    EXPECT_EQ(readFile(folder.file("data")), "abc45");
+}
+
 TEST(FileStreams, OpenNamesOutsideAscii)
 {
     const TemporaryFolder folder;

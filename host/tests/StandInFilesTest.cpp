@@ -142,6 +142,25 @@ TEST(StandInFileStreams, AppendAndStartAtTheEndWhenAsked)
     EXPECT_EQ(in.get(), std::char_traits<char>::eof());
 }
 
+TEST(StandInFileStreams, FollowNoLink)
+{
+    const TemporaryFolder folder;
+    writeFile(folder.file("data"), "text");
+    ASSERT_EQ(::symlink("data", folder.file("link").c_str()), 0);
+    ASSERT_EQ(::symlink("missing", folder.file("dangling").c_str()), 0);
+    EXPECT_FALSE(basic_ifstream<char>(folder.ufile("link")).is_open());
+    for (const std::string name : {"link", "dangling"})
+    {
+        for (const auto mode :
+             {std::ios_base::out, std::ios_base::app, std::ios_base::in | std::ios_base::out})
+        {
+            EXPECT_FALSE(basic_ofstream<char>(folder.ufile(name), mode).is_open()) << name;
+        }
+    }
+    EXPECT_EQ(readFile(folder.file("data")), "text");
+    EXPECT_FALSE(fl::filesystem::exists(upath(folder.ufile("missing"))));
+}
+
 TEST(StandInFileStreams, MoveToAPlaceInTheFile)
 {
     const TemporaryFolder folder;

@@ -15,6 +15,7 @@
 #include "MergeDriverTest.hpp"
 #include "error/errorUtil/callbackException.hpp"
 #include "support/SignalAction.hpp"
+#include "support/text.hpp"
 #include "util/processError.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
 
@@ -93,6 +94,33 @@ TEST_F(MergeDriverFailure, IsALogicErrorForAKeyWithoutAValue)
         const LogCapture log;
         EXPECT_THROW(mergeOrThrow(), std::logic_error);
     }
+}
+
+/// Whoever may write to the temporary folder could choose a file of the user's, for all to read.
+TEST_F(MergeDriverFailure, IsOneWhenALinkIsInThePlaceOfTheMergedFile)
+{
+    makeConflict();
+    const std::string secret = folder() / "secret";
+    repository_.write("../secret", "secret\n");
+    for (const std::string &target : {secret, secret + "-missing"})
+    {
+        defineScript("tool", "ln -sf '" + target + "' \"$2\"");
+        try
+        {
+            mergeOrThrow();
+            ADD_FAILURE() << "merged through the link to " << target;
+        }
+        catch (const LibGit2Exception &exception)
+        {
+            EXPECT_EQ(exception.getError().getCode(), GIT_ERROR);
+            EXPECT_EQ(exception.getError().getErrorClass(), GIT_ERROR_MERGE);
+            EXPECT_THAT(vclink::test::asUtf8(exception.getError().getMessage()),
+                        testing::StartsWith("a symbolic link is in the place of the merged file"));
+        }
+        EXPECT_EQ(repository_.read("file"), "ours\n");
+        EXPECT_EQ(staged("file"), "ours\n");
+    }
+    EXPECT_FALSE(std::filesystem::exists(secret + "-missing"));
 }
 
 TEST_F(MergeDriverFailure, IsLibGit2sWhenASideCannotBeRead)

@@ -28,7 +28,7 @@ using FileBuffer = boost::iostreams::stream_buffer<Device, Traits>;
 // Boost opens files without O_CLOEXEC, so the descriptor is made here and handed over.
 int openForReading(const ustring &name, std::ios_base::openmode mode)
 {
-    const int descriptor = openNative(name, O_RDONLY, 0);
+    const int descriptor = openNative(name, O_RDONLY | O_NOFOLLOW, 0);
     if (descriptor >= 0 && (mode & std::ios_base::ate) != 0)
     {
         ::lseek(descriptor, 0, SEEK_END);
@@ -39,7 +39,9 @@ int openForReading(const ustring &name, std::ios_base::openmode mode)
 int openForWriting(const ustring &name, std::ios_base::openmode mode)
 {
     const bool append = (mode & std::ios_base::app) != 0;
-    return openNative(name, O_WRONLY | O_CREAT | (append ? O_APPEND : O_TRUNC), modeOfNewFiles);
+    const bool update = (mode & std::ios_base::in) != 0 && (mode & std::ios_base::trunc) == 0;
+    const int create = update && !append ? 0 : O_CREAT | (append ? O_APPEND : O_TRUNC);
+    return openNative(name, O_WRONLY | O_NOFOLLOW | create, modeOfNewFiles);
 }
 
 /// A buffer over the descriptor, which it owns; one without a file when there is no descriptor.
