@@ -4,6 +4,7 @@
 #include <stdexcept>
 #include <string>
 #include <type_traits>
+#include <vector>
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
@@ -63,6 +64,19 @@ TEST(ScopeTrace, CountsTheScopesThatAreOpen)
     }
     EXPECT_EQ(logger().scope_depth(), 0);
     EXPECT_THAT(log.messages(), ElementsAre("outer", "inner", "inner", "outer"));
+}
+
+/// A host's output may indent each record by the count.
+TEST(ScopeTrace, CountsAfterItsEntryRecordAndBeforeItsExitRecord)
+{
+    LogCapture log;
+    std::vector<int> counts;
+    log.onRecord([&counts](const test::LogRecord &) { counts.push_back(logger().scope_depth()); });
+    {
+        const ScopeTrace outer(logger(), "outer", "file", 1);
+        const ScopeTrace inner(logger(), "inner", "file", 2);
+    }
+    EXPECT_THAT(counts, ElementsAre(0, 1, 1, 0));
 }
 
 TEST(ScopeTrace, TellsThatAnExceptionPasses)

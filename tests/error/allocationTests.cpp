@@ -1,9 +1,11 @@
 // SPDX-License-Identifier: MIT
 // What costs no allocation.
+#include <cstddef>
 #include <exception>
 #include <string>
 #include <utility>
 
+#include <boost/log/core/core.hpp>
 #include <gtest/gtest.h>
 
 #include "error/errorUtil/GitErrorPolicy.hpp"
@@ -49,6 +51,21 @@ TEST(Allocations, AreNoneForADisabledSeverity)
         " (", -7, ")");
     EXPECT_EQ(counter.count(), 0u);
     EXPECT_FALSE(isAsked);
+}
+
+/// Opening a record would take some: Boost.Log is asked before.
+TEST(Allocations, AreNoneForARecordWhileBoostLogIsSwitchedOff)
+{
+    const LogCapture log;
+    writeRecord(SeverityDiagnostic, "The first record makes what Boost.Log keeps.");
+    const auto core = boost::log::core::get();
+    core->set_logging_enabled(false);
+    const AllocationCounter counter;
+    writeRecord(SeverityDiagnostic, "text");
+    const std::size_t count = counter.count();
+    core->set_logging_enabled(true);
+    EXPECT_EQ(count, 0u);
+    EXPECT_EQ(log.messages().size(), 1u);
 }
 
 TEST(Allocations, AreNoneForATraceThatIsDisabled)

@@ -13,6 +13,7 @@
 #include "AdapterTest.hpp"
 #include "support/LogCapture.hpp"
 #include "support/text.hpp"
+#include "vclink/WorkingCopyGenerator.hpp"
 #include "vclink/exception/SourceControlException.hpp"
 #include "vclink/git/BranchManager.hpp"
 #include "vclink/git/GitAdapterFactory.hpp"
@@ -177,6 +178,19 @@ TEST_F(GuardRegistration, IsLostWithAnObjectForTheConfiguration)
         EXPECT_TRUE(runsTheCommand(*adapter));
     }
     EXPECT_FALSE(runsTheCommand(*adapter));
+}
+
+TEST_F(GuardRegistration, IsLostWithAGenerator)
+{
+    const auto adapter = newAdapter();
+    {
+        const auto generator = GitAdapterFactory().createWorkingCopyGenerator(interactor_);
+        EXPECT_TRUE(runsTheCommand(*adapter));
+    }
+    EXPECT_FALSE(isRegistered());
+    EXPECT_FALSE(runsTheCommand(*adapter));
+    const auto next = GitAdapterFactory().createWorkingCopyGenerator(interactor_);
+    EXPECT_TRUE(runsTheCommand(*adapter));
 }
 
 TEST_F(GuardRegistration, IsLostAndRegainedByGuardsOfAnotherThread)

@@ -226,6 +226,35 @@ TEST_F(RemoteCalls, OfACloneAreGivenTheTextsAndASafeRecord)
 }
 
 /// The error is read before the release, which may replace libgit2's record of it.
+TEST_F(RemoteCalls, OfACloneComeAfterItsRecordItsTextsAndItsOptions)
+{
+    const vclink::test::LogCapture log(git::SeverityParameter);
+    Names toldAtTheOptions;
+    auto factory = std::make_unique<vclink::test::TestOptionsFactory>(interactor_);
+    factory->onCloneOptions = [&]
+    {
+        toldAtTheOptions = log.messages();
+        calls_.note("makeCloneOptions");
+    };
+    git::GitWorkingCopyGenerator generator(std::move(factory));
+    calls_.clear();
+    const std::string target = folder() / "ordered";
+    generator.generate(asUtf16(nameOf(server_)), asPath(target));
+    Names expected{"makeCloneOptions"};
+    expected.insert(expected.end(), ofClone.begin(), ofClone.end());
+    EXPECT_EQ(calls_.steps(), expected);
+    EXPECT_THAT(toldAtTheOptions, ElementsAre(" repositorySpecifier=" + nameOf(server_) +
+                                              " sandboxRoot.string()=" + target));
+    // A text that libgit2 can't take is told of, and refused before the options are asked for.
+    toldAtTheOptions.clear();
+    EXPECT_EQ(libGit2FailureOf(
+                  [&] { generator.generate(ustring(u"a\0b", 3), asPath(folder() / "refused")); })
+                  .code,
+              GIT_EINVALIDSPEC);
+    EXPECT_THAT(toldAtTheOptions, IsEmpty());
+    EXPECT_EQ(log.messages().back().compare(0, 21, " repositorySpecifier="), 0);
+}
+
 TEST_F(RemoteCalls, OfACloneThatFailsReleaseWhatItLeft)
 {
     calls_.answer<git_clone>(

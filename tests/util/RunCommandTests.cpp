@@ -159,6 +159,26 @@ TEST_F(RunCommand, DropsStandardError)
     EXPECT_EQ(output, "kept");
 }
 
+TEST_F(RunCommand, LosesStandardErrorAtEveryLoggingLevel)
+{
+    // The record of the command names the script, not what it prints.
+    const std::string program = scripts_.shell("cat >&2 <<END\nlost\nEND\n" + waitUntilRead());
+    std::vector<unsigned> masks{0, vclink::test::LogCapture::allSeverities};
+    for (unsigned bit = 1; bit != 0; bit <<= 1)
+        masks.push_back(bit);
+    for (const unsigned mask : masks)
+    {
+        const vclink::test::LogCapture log(mask);
+        testing::internal::CaptureStdout();
+        testing::internal::CaptureStderr();
+        EXPECT_EQ(resultOf(program), 0);
+        EXPECT_EQ(testing::internal::GetCapturedStderr(), "") << mask;
+        EXPECT_EQ(testing::internal::GetCapturedStdout(), "") << mask;
+        for (const std::string &message : log.messages())
+            EXPECT_EQ(message.find("lost"), std::string::npos) << mask << ": " << message;
+    }
+}
+
 TEST_F(RunCommand, TellsOfTheExpandedCommandAndItsOutput)
 {
     const std::string program = scripts_.shell("echo one; echo two\n" + waitUntilRead());
