@@ -33,6 +33,45 @@ static size_t listBranches(const char *root)
     return bytes == 0 ? 0 : count;
 }
 
+/// Deletes the first so many of the branches that the bench makes, each with a repository of its
+/// own.
+static size_t deleteBranches(const char *root, const char *count)
+{
+    const size_t all = strtoul(count, NULL, 10);
+    for (size_t number = 0; number < all; ++number)
+    {
+        char name[32];
+        git_reference *branch = NULL;
+        git_repository *const repository = openRepository(root);
+        snprintf(name, sizeof name, "topic-%05zu", number);
+        check(git_branch_lookup(&branch, repository, name, GIT_BRANCH_LOCAL), "git_branch_lookup");
+        check(git_branch_delete(branch), "git_branch_delete");
+        git_reference_free(branch);
+        git_repository_free(repository);
+    }
+    return all;
+}
+
+/// Asks each of these branches for its commit.
+static size_t readRevisions(const char *root, const char *count)
+{
+    const size_t all = strtoul(count, NULL, 10);
+    size_t bytes = 0;
+    for (size_t number = 0; number < all; ++number)
+    {
+        char name[32];
+        char digits[GIT_OID_HEXSZ + 1];
+        git_object *object = NULL;
+        git_repository *const repository = openRepository(root);
+        snprintf(name, sizeof name, "topic-%05zu", number);
+        check(git_revparse_single(&object, repository, name), "git_revparse_single");
+        bytes += strlen(git_oid_tostr(digits, sizeof digits, git_object_id(object)));
+        git_object_free(object);
+        git_repository_free(repository);
+    }
+    return bytes == 0 ? 0 : all;
+}
+
 static git_checkout_options makeCheckoutOptions(unsigned strategy, size_t *calls)
 {
     git_checkout_options options;
@@ -138,6 +177,14 @@ static void measure(const char *operation, const char *root, const char *name)
     {
         count = listBranches(root);
     }
+    else if (strcmp(operation, "delete") == 0)
+    {
+        count = deleteBranches(root, name);
+    }
+    else if (strcmp(operation, "revisions") == 0)
+    {
+        count = readRevisions(root, name);
+    }
     else if (strcmp(operation, "switch") == 0)
     {
         switchBranch(root, name);
@@ -157,6 +204,17 @@ static void measureChild(const char *operation, const char *root, const char *na
     if (strcmp(operation, "branches") == 0)
     {
         measureShell("exec git -C \"$BENCH_ROOT\" for-each-ref refs/heads");
+    }
+    else if (strcmp(operation, "delete") == 0)
+    {
+        measureShell("git -C \"$BENCH_ROOT\" for-each-ref --count=\"$BENCH_NAME\" "
+                     "--format='%(refname:short)' refs/heads/topic-* "
+                     "| xargs git -C \"$BENCH_ROOT\" branch --quiet -D");
+    }
+    else if (strcmp(operation, "revisions") == 0)
+    {
+        measureShell("exec git -C \"$BENCH_ROOT\" for-each-ref --count=\"$BENCH_NAME\" "
+                     "refs/heads/topic-*");
     }
     else if (strcmp(operation, "switch") == 0)
     {
@@ -181,6 +239,8 @@ static void loadLibrary(void)
 int main(int argc, char **argv)
 {
     loadLibrary();
-    return runFloor(argc, argv, "branch_floor [child] branches|switch|merge|driver ROOT NAME",
+    return runFloor(argc, argv,
+                    "branch_floor [child] branches|delete|revisions|switch|merge|driver ROOT "
+                    "NAME|COUNT",
                     measure, measureChild);
 }

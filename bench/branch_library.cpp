@@ -14,11 +14,44 @@ namespace
 using namespace vclink::bench;
 using vclink::git::BranchManager;
 
+std::string nameOf(std::size_t number)
+{
+    const std::string digits = std::to_string(number);
+    return "topic-" + std::string(5 - digits.size(), '0') + digits;
+}
+
+std::size_t deleteBranches(BranchManager &manager, std::size_t count)
+{
+    for (std::size_t number = 0; number < count; ++number)
+    {
+        manager.deleteBranch(nameOf(number));
+    }
+    return count;
+}
+
+std::size_t readRevisions(const BranchManager &manager, std::size_t count)
+{
+    std::size_t bytes = 0;
+    for (std::size_t number = 0; number < count; ++number)
+    {
+        bytes += manager.getRevision(nameOf(number)).size();
+    }
+    return bytes == 0 ? 0 : count;
+}
+
 std::size_t carryOut(BranchManager &manager, const std::string &operation, const std::string &name)
 {
     if (operation == "branches")
     {
         return manager.getLocalBranches().size();
+    }
+    if (operation == "delete")
+    {
+        return deleteBranches(manager, std::stoul(name));
+    }
+    if (operation == "revisions")
+    {
+        return readRevisions(manager, std::stoul(name));
     }
     if (operation == "switch")
     {
@@ -47,7 +80,9 @@ int main(int argc, char **argv)
 {
     if (argc != 4)
     {
-        std::fputs("usage: branch_library branches|switch|merge|driver ROOT NAME\n", stderr);
+        std::fputs("usage: branch_library branches|delete|revisions|switch|merge|driver ROOT "
+                   "NAME|COUNT\n",
+                   stderr);
         return 2;
     }
     try

@@ -16,6 +16,8 @@ CHANGED = 1_000
 IN_COMMON = 100
 BRANCHES = 10_000
 DRIVEN = 100
+PACKED = 2_000
+FEW = 50
 
 
 def text(number, first="first", last="last"):
@@ -51,6 +53,10 @@ class Operation:
         self.limit = limit
         self.driver = driver
         self._branch = "theirs"
+        # How many branches are made and packed, and how many of them the programs go through.
+        self._packed = {"branches": BRANCHES, "delete": PACKED, "revisions": PACKED}.get(name)
+        if name in ("delete", "revisions"):
+            self._branch = str(FEW)
 
     def make(self, folder, env):
         self._env = env
@@ -64,9 +70,9 @@ class Operation:
                            input=b"".join(export_stream(base, ours, theirs, attributes)))
         if self.driver:
             working_copies.git(self._root, env, "config", "merge.tool.driver", self.driver)
-        if self.name == "branches":
+        if self._packed:
             lines = "".join(f"create refs/heads/topic-{number:05d} main\n"
-                            for number in range(BRANCHES - 2))
+                            for number in range(self._packed - 2))
             working_copies.git(self._root, env, "update-ref", "--stdin", input=lines.encode())
             working_copies.git(self._root, env, "pack-refs", "--all")
         self._files = {**base, **ours}
@@ -78,7 +84,7 @@ class Operation:
         shutil.copytree(os.path.join(self._root, ".git"), self._saved)
 
     def _sides(self):
-        if self.name == "branches":
+        if self._packed:
             return {0: text(0)}, {}, {}
         if self.name == "driver":
             numbers = range(DRIVEN)
@@ -100,7 +106,7 @@ class Operation:
             os.utime(path, (past, past))
 
     def put_back(self):
-        if self.name == "branches":
+        if self.name in ("branches", "revisions"):
             return
         shutil.rmtree(os.path.join(self._root, ".git"))
         shutil.copytree(self._saved, os.path.join(self._root, ".git"))
@@ -115,6 +121,8 @@ class BranchBench:
         self._scratch = scratch
         self._operations = [
             Operation("branches", f"{BRANCHES:,} branches listed", 1.15),
+            Operation("delete", f"{FEW} of {PACKED:,} branches deleted", 1.15),
+            Operation("revisions", f"{FEW} of {PACKED:,} branches asked for their commit", 1.15),
             Operation("switch", f"switch over {CHANGED:,} of {FILES:,} files", 1.03),
             Operation("merge", f"merge of {CHANGED:,} files on either side", 1.03),
             Operation("driver", f"merge of {DRIVEN} files by vkAutoMerge.sh", 1.10,
