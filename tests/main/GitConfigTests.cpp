@@ -121,7 +121,7 @@ TEST_F(GitConfigFile, IsLeftAloneWhereAKeyHasSeveralValuesOrAnIncludedOne)
 {
     const std::string tool = "[mergetool \"vkMerge\"]\n\tcmd = one\n";
     writeFile(environment().home() / "included", tool);
-    for (const std::string text :
+    for (const std::string &text :
          {tool + "\tcmd = two\n",
           "[include]\n\tpath = " + (environment().home() / "included").string() + '\n'})
     {
