@@ -1,0 +1,267 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <atomic>
+#include <chrono>
+#include <cstddef>
+#include <exception>
+#include <filesystem>
+#include <functional>
+#include <string>
+#include <system_error>
+#include <utility>
+#include <vector>
+
+#include <boost/variant/get.hpp>
+
+#include "fl/filesystem/path.hpp"
+#include "fl/i18n/convert.hpp"
+#include "fl/ustring.hpp"
+#include "foundation/core/except/IUserException.hpp"
+#include "vclink/CMAdapter.hpp"
+#include "vclink/FileState.hpp"
+#include "vclink/ProgressReporter.hpp"
+#include "vclink/git/LibGit2Exception.hpp"
+#include "vclink/util/exception/CancelledOperationException.hpp"
+
+/// What a host writes around the library: copy this header into a host, and change it there. It is
+/// no part of the library's interface, and makes no promise from one release to the next.
+namespace host_tools
+{
+
+// ---- Paths. Both ways keep every byte, also of names that are not UTF-8.
+
+inline std::filesystem::path toStdPath(const upath &path)
+{
+    return fl::i18n::ustring_to_utf8(path.string());
+}
+
+inline upath toUpath(const std::filesystem::path &path)
+{
+    return upath(fl::i18n::utf8_to_ustring(path.string()));
+}
+
+/// The part of a path that an adapter gave out behind the adapter's root.
+inline ustring relativeName(const upath &path, const upath &root)
+{
+    std::size_t start = root.string().size();
+    while (start < path.string().size() && path.string()[start] == u'/')
+        ++start;
+    return path.string().substr(start);
+}
+
+/// The order of FileStateMap, for std::sort and the like.
+struct PathOrder
+{
+    bool operator()(const upath &left, const upath &right) const noexcept
+    {
+        return std::less<upath>()(left, right);
+    }
+};
+
+/// For std::unordered_map and std::unordered_set.
+struct PathHash
+{
+    std::size_t operator()(const upath &path) const noexcept
+    {
+        return std::hash<ustring>()(path.string());
+    }
+};
+
+/// Whether an operation on this path acts on this very file and on no other. In a list of files the
+/// characters '*', '?' and '[' make a pattern, a backslash is taken for a slash, and a symbolic
+/// link means its target.
+inline bool meansOnlyItself(const upath &path)
+{
+    std::error_code ignored;
+    return path.string().find_first_of(u"*?[\\") == ustring::npos &&
+           !std::filesystem::is_symlink(toStdPath(path), ignored);
+}
+
+// ---- States.
+
+/// A word for the state, in lower case. A number that is not known counts as "unknown".
+inline const char *nameOf(vclink::FileState state) noexcept
+{
+    switch (state.getState())
+    {
+    case vclink::FileState::Unversioned:
+        return "unversioned";
+    case vclink::FileState::Clean:
+        return "clean";
+    case vclink::FileState::InConflict:
+        return "conflict";
+    case vclink::FileState::Modified:
+        return "modified";
+    case vclink::FileState::Added:
+        return "added";
+    case vclink::FileState::Deleted:
+        return "deleted";
+    case vclink::FileState::Missing:
+        return "missing";
+    case vclink::FileState::Unknown:
+        break;
+    }
+    return "unknown";
+}
+
+/// The files that have to be resolved before a commit; in the order of FileStateMap.
+inline std::vector<upath> filesInConflict(vclink::CMAdapter &adapter)
+{
+    std::vector<upath> files;
+    for (const auto &[path, state] : adapter.getFolderStates(adapter.getRootFolder()))
+    {
+        if (state.getState() == vclink::FileState::InConflict)
+            files.push_back(path);
+    }
+    return files;
+}
+
+// ---- Progress.
+
+/// Passes reports on at most once in an interval, as a checkout makes two for each file. The first
+/// report and the end always pass. Called on the thread of the operation, and so is `show`.
+class ThrottledProgress : public vclink::ProgressReporter
+{
+  public:
+    using Clock = std::chrono::steady_clock;
+    using Show = std::function<void(double fraction, const ustring &message)>;
+
+    explicit ThrottledProgress(Show show, Clock::duration interval = std::chrono::milliseconds(50))
+        : show_(std::move(show)), interval_(interval)
+    {
+    }
+
+    void setProgress(double fraction) override
+    {
+        fraction_ = fraction;
+        const bool isFirst = !begun_.exchange(true);
+        pass(isFirst || fraction >= 1.0);
+    }
+    void setProgressMessage(const ustring &message) override
+    {
+        message_ = message;
+        pass(false);
+    }
+
+    /// Whether the checkout writes files: from then on it can't be cancelled. Any thread.
+    bool hasBegun() const noexcept
+    {
+        return begun_.load();
+    }
+
+  private:
+    void pass(bool always)
+    {
+        const auto now = Clock::now();
+        if (!always && now - passed_ < interval_)
+            return;
+        passed_ = now;
+        show_(fraction_, message_);
+    }
+
+    Show show_;
+    Clock::duration interval_;
+    Clock::time_point passed_;
+    double fraction_ = 0.0;
+    ustring message_;
+    std::atomic<bool> begun_{false};
+};
+
+// ---- Failures.
+
+/// What an exception of an operation means, by the identifier of its message.
+enum class FailureKind
+{
+    Cancelled,                ///< the host asked for it
+    LibGit2Error,             ///< a call to libgit2 failed; `code` says more
+    MergeFailed,              ///< any failed merge, a cancelled one and one with conflicts included
+    AlreadyAdded,             ///< `files` are known to Git
+    NoFilesToRemove,          ///< nothing was named that can be removed
+    Conflicted,               ///< `files` are in conflict
+    NoUserName,               ///< a commit has no author
+    InvalidGitAttributeValue, ///< an attribute of an unknown kind
+    Other                     ///< of the system, or of the host itself
+};
+
+/// A failure as a host shows it.
+struct Failure
+{
+    FailureKind kind = FailureKind::Other;
+    /// e.g. "shared_vclink:git:AlreadyAdded"; empty for exceptions without a message identifier
+    std::string id;
+    /// For the user, in the locale that was current when the failure was described.
+    ustring text;
+    /// One path a line, where the kind has files.
+    ustring files;
+    /// libgit2's return code, or 0.
+    int code = 0;
+
+    /// Whether another operation or program holds a lock, so that trying again is worth while.
+    bool isLocked() const noexcept
+    {
+        constexpr int locked = -14; // GIT_ELOCKED
+        return code == locked;
+    }
+};
+
+/// The kind that an identifier of the catalogue stands for.
+inline FailureKind kindOf(const std::string &id)
+{
+    static constexpr std::pair<const char *, FailureKind> kinds[] = {
+        {"LibGit2Error", FailureKind::LibGit2Error},
+        {"MergeFailed", FailureKind::MergeFailed},
+        {"AlreadyAdded", FailureKind::AlreadyAdded},
+        {"NoFilesToRemove", FailureKind::NoFilesToRemove},
+        {"Conflicted", FailureKind::Conflicted},
+        {"NoUserName", FailureKind::NoUserName},
+        {"InvalidGitAttributeValue", FailureKind::InvalidGitAttributeValue}};
+    for (const auto &[key, kind] : kinds)
+    {
+        if (id == std::string("shared_vclink:git:") + key)
+            return kind;
+    }
+    return FailureKind::Other;
+}
+
+/// What an exception of the library says. Any thread, but one at a time for one exception.
+inline Failure describe(const std::exception_ptr &exception)
+{
+    Failure failure;
+    try
+    {
+        std::rethrow_exception(exception);
+    }
+    catch (const vclink::util::exception::CancelledOperationException &cancelled)
+    {
+        failure.kind = FailureKind::Cancelled;
+        failure.text = fl::i18n::to_ustring(cancelled.what());
+    }
+    catch (const foundation::core::except::IUserException &user)
+    {
+        failure.id = user.GetID();
+        failure.kind = kindOf(failure.id);
+        failure.text = user.GetUnicodeMessageTxt();
+        if (const auto *git = dynamic_cast<const vclink::git::LibGit2Exception *>(&user))
+            failure.code = git->getError().getCode();
+        const auto &arguments = user.GetBaseMsgIDObj().getArguments();
+        const bool hasFiles =
+            failure.kind == FailureKind::AlreadyAdded || failure.kind == FailureKind::Conflicted;
+        if (hasFiles && !arguments.empty())
+        {
+            if (const auto *files = boost::get<ustring>(&arguments.front()))
+                failure.files = *files;
+        }
+    }
+    catch (const std::exception &other)
+    {
+        failure.text = fl::i18n::to_ustring(other.what());
+    }
+    catch (...)
+    {
+        failure.text = u"An error of an unknown kind.";
+    }
+    return failure;
+}
+
+} // namespace host_tools
