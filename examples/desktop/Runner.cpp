@@ -1,0 +1,155 @@
+// SPDX-License-Identifier: MIT
+#include "Runner.hpp"
+
+#include <exception>
+#include <utility>
+
+#include <QMetaObject>
+
+#include "language.hpp"
+#include "text.hpp"
+#include "vclink_host/cancellation.hpp"
+
+namespace vclink::desktop
+{
+
+Runner::Runner(std::shared_mutex &guards, RunnerListener listener)
+    : guards_(guards), listener_(std::move(listener))
+{
+}
+
+Runner::~Runner() = default;
+
+void Runner::setRoot(const upath &root)
+{
+    root_ = root;
+    refresh();
+}
+
+bool Runner::run(Operation operation)
+{
+    if (operation_ != nullptr)
+        return false;
+    operation_ = std::make_shared<Operation>(std::move(operation));
+    isAttached_ = isAsked_ = false;
+    interactor_ = std::make_shared<Interactor>(
+        [this](double fraction, const ustring &message)
+        { post([this, fraction, message] { showProgress(fraction, message); }); });
+    worker_.post([this, root = root_, operation = operation_, interactor = interactor_]
+                 { execute(root, *operation, interactor); });
+    listener_.changed();
+    return true;
+}
+
+void Runner::execute(const upath &root, const Operation &operation,
+                     const std::shared_ptr<Interactor> &interactor)
+{
+    std::exception_ptr failure;
+    try
+    {
+        Work work(guards_, root, interactor, [this] { post([this] { attached(); }); });
+        operation.run(work);
+    }
+    catch (...)
+    {
+        failure = std::current_exception();
+    }
+    post([this, failure] { finish(failure); });
+}
+
+bool Runner::canCancel() const
+{
+    return operation_ != nullptr && isAttached_ && !isAsked_ && !interactor_->isWriting() &&
+           (operation_->kind == Operation::Kind::Checkout ||
+            operation_->kind == Operation::Kind::Download);
+}
+
+void Runner::cancel()
+{
+    if (!canCancel())
+        return;
+    isAsked_ = true;
+    vclink_host::requestCancellation(interactor_->getTerminator());
+    listener_.changed();
+}
+
+void Runner::attached()
+{
+    isAttached_ = true;
+    listener_.changed();
+}
+
+void Runner::showProgress(double fraction, const ustring &message)
+{
+    listener_.progress(fraction, printable(message));
+    listener_.changed();
+}
+
+void Runner::finish(std::exception_ptr failure)
+{
+    const auto operation = std::exchange(operation_, nullptr);
+    interactor_.reset();
+    refresh();
+    listener_.changed();
+    if (failure == nullptr)
+    {
+        if (isAsked_)
+            listener_.told(say("Too late to cancel: it was done already."));
+        if (operation->done)
+            operation->done();
+        return;
+    }
+    auto described = host_tools::describe(failure);
+    // A merge has no exception of its own for it: only the host knows that it has asked.
+    if (isAsked_ && described.kind == host_tools::FailureKind::MergeFailed)
+        described.kind = host_tools::FailureKind::Cancelled;
+    if (!operation->failed || !operation->failed(described))
+        listener_.failed(*operation, described);
+}
+
+void Runner::refresh()
+{
+    readsAgain_ = true;
+    readAgain();
+}
+
+void Runner::readAgain()
+{
+    if (operation_ != nullptr || isReading_ || !readsAgain_ || root_.string().empty())
+        return;
+    isReading_ = true;
+    readsAgain_ = false;
+    worker_.post(
+        [this, root = root_]
+        {
+            std::shared_ptr<const Snapshot> snapshot;
+            QString failure;
+            try
+            {
+                Work work(guards_, root,
+                          std::make_shared<Interactor>([](double, const ustring &) {}), [] {});
+                snapshot = std::make_shared<Snapshot>(readSnapshot(work));
+            }
+            catch (...)
+            {
+                failure = toQString(host_tools::describe(std::current_exception()).text);
+            }
+            post(
+                [this, snapshot, failure]
+                {
+                    isReading_ = false;
+                    if (snapshot == nullptr)
+                        listener_.told(failure);
+                    else if (snapshot->root == root_)
+                        listener_.refreshed(snapshot);
+                    readAgain();
+                });
+        });
+}
+
+void Runner::post(std::function<void()> function)
+{
+    QMetaObject::invokeMethod(this, std::move(function), Qt::QueuedConnection);
+}
+
+} // namespace vclink::desktop

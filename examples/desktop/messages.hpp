@@ -1,0 +1,22 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <functional>
+
+#include <QString>
+
+#include "hostTools.hpp"
+
+class QWidget;
+
+/// Boxes with a text, which do not stop the window. Each deletes itself when it is closed.
+namespace vclink::desktop
+{
+
+void showMessage(QWidget *parent, const QString &text);
+/// The library's text, with what helps by the kind of the failure, and details to unfold.
+void showFailure(QWidget *parent, const QString &title, const host_tools::Failure &failure);
+/// @param confirmed called if the person says yes
+void askFor(QWidget *parent, const QString &question, std::function<void()> confirmed);
+
+} // namespace vclink::desktop
