@@ -18,9 +18,11 @@
 #include "fl/i18n/convert.hpp"
 #include "fl/ustring.hpp"
 #include "foundation/core/except/IUserException.hpp"
+#include "vclink/ApplicationInteractor.hpp"
 #include "vclink/CMAdapter.hpp"
 #include "vclink/FileState.hpp"
 #include "vclink/ProgressReporter.hpp"
+#include "vclink/Terminator.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
 #include "vclink/util/exception/CancelledOperationException.hpp"
 
@@ -166,6 +168,37 @@ class ThrottledProgress : public vclink::ProgressReporter
     double fraction_ = 0.0;
     ustring message_;
     std::atomic<bool> begun_{false};
+};
+
+/// Where an operation reports its progress, and where it is cancelled from. Make a new one, and a
+/// new adapter with it, for each operation that can be cancelled: a request that comes too late is
+/// remembered, and would stop the next operation of the same adapter.
+class Interactor : public vclink::ApplicationInteractor
+{
+  public:
+    /// @param show see ThrottledProgress
+    explicit Interactor(ThrottledProgress::Show show) : progress_(std::move(show))
+    {
+    }
+
+    vclink::Terminator &getTerminator() override
+    {
+        return terminator_;
+    }
+    vclink::ProgressReporter *getProgressReporter() override
+    {
+        return &progress_;
+    }
+
+    /// Whether a checkout writes files, which can't be cancelled. Any thread.
+    bool isWriting() const noexcept
+    {
+        return progress_.hasBegun();
+    }
+
+  private:
+    vclink::Terminator terminator_;
+    ThrottledProgress progress_;
 };
 
 // ---- Failures.

@@ -32,7 +32,7 @@ bool Runner::run(Operation operation)
         return false;
     operation_ = std::make_shared<Operation>(std::move(operation));
     isAttached_ = isAsked_ = false;
-    interactor_ = std::make_shared<Interactor>(
+    interactor_ = std::make_shared<host_tools::Interactor>(
         [this](double fraction, const ustring &message)
         { post([this, fraction, message] { showProgress(fraction, message); }); });
     worker_.post([this, root = root_, operation = operation_, interactor = interactor_]
@@ -42,7 +42,7 @@ bool Runner::run(Operation operation)
 }
 
 void Runner::execute(const upath &root, const Operation &operation,
-                     const std::shared_ptr<Interactor> &interactor)
+                     const std::shared_ptr<host_tools::Interactor> &interactor)
 {
     std::exception_ptr failure;
     try
@@ -127,7 +127,8 @@ void Runner::readAgain()
             try
             {
                 Work work(guards_, root,
-                          std::make_shared<Interactor>([](double, const ustring &) {}), [] {});
+                          std::make_shared<host_tools::Interactor>([](double, const ustring &) {}),
+                          [] {});
                 snapshot = std::make_shared<Snapshot>(readSnapshot(work));
             }
             catch (...)

@@ -9,10 +9,10 @@
 #include <QObject>
 #include <QString>
 
-#include "Interactor.hpp"
 #include "Snapshot.hpp"
 #include "Work.hpp"
 #include "Worker.hpp"
+#include "hostTools.hpp"
 
 namespace vclink::desktop
 {
@@ -82,7 +82,7 @@ class Runner : public QObject
 
   private:
     void execute(const upath &root, const Operation &operation,
-                 const std::shared_ptr<Interactor> &interactor);
+                 const std::shared_ptr<host_tools::Interactor> &interactor);
     void attached();
     void showProgress(double fraction, const ustring &message);
     void finish(std::exception_ptr failure);
@@ -94,7 +94,7 @@ class Runner : public QObject
     RunnerListener listener_;
     upath root_;
     std::shared_ptr<Operation> operation_;
-    std::shared_ptr<Interactor> interactor_;
+    std::shared_ptr<host_tools::Interactor> interactor_;
     bool isAttached_ = false;
     bool isAsked_ = false;
     bool isReading_ = false;

@@ -55,6 +55,13 @@ TEST_F(BranchCommands, NewBranchBeginsWhereItIsTold)
     EXPECT_EQ(head(), "main");
 }
 
+TEST_F(BranchCommands, NewBranchBeginsAtTheLastCommitIfNothingElseIsChosen)
+{
+    open();
+    choose("newBranch", {"lake"});
+    EXPECT_EQ(repository_.line({"rev-parse", "lake"}), repository_.line({"rev-parse", "HEAD"}));
+}
+
 TEST_F(BranchCommands, DeleteTellsTheCommitForTheWayBack)
 {
     makeBranch("topic", "b", "topic\n");

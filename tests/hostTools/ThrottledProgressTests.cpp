@@ -9,6 +9,9 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include "vclink/PollableTerminator.hpp"
+#include "vclink_host/cancellation.hpp"
+
 namespace
 {
 
@@ -61,6 +64,18 @@ TEST_F(Throttled, ShowsEverythingWithoutAnInterval)
     progress.setProgressMessage(u"file");
     progress.setProgress(0.25);
     EXPECT_EQ(shown_.size(), 3u);
+}
+
+TEST_F(Throttled, IsWhatTheInteractorOfAnOperationReportsTo)
+{
+    host_tools::Interactor interactor(show());
+    EXPECT_FALSE(interactor.isWriting());
+    interactor.getProgressReporter()->setProgress(0.0);
+    EXPECT_TRUE(interactor.isWriting());
+    EXPECT_EQ(shown_.size(), 1u);
+    vclink::PollableTerminator poller(interactor.getTerminator());
+    vclink_host::requestCancellation(interactor.getTerminator());
+    EXPECT_TRUE(poller.checkAndResetCancelledState());
 }
 
 } // namespace
