@@ -7,6 +7,7 @@
 #include <exception>
 #include <filesystem>
 #include <functional>
+#include <stdexcept>
 #include <string>
 #include <system_error>
 #include <utility>
@@ -21,8 +22,10 @@
 #include "vclink/ApplicationInteractor.hpp"
 #include "vclink/CMAdapter.hpp"
 #include "vclink/FileState.hpp"
+#include "vclink/FileStateMap.hpp"
 #include "vclink/ProgressReporter.hpp"
 #include "vclink/Terminator.hpp"
+#include "vclink/git/BranchManager.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
 #include "vclink/util/exception/CancelledOperationException.hpp"
 
@@ -107,11 +110,45 @@ inline const char *nameOf(vclink::FileState state) noexcept
     return "unknown";
 }
 
+/// Libgit2 can't read the working copy. Its state queries report no file then, and do not fail, so
+/// that everything looks clean.
+class StatesUnknown : public std::runtime_error
+{
+  public:
+    StatesUnknown() : std::runtime_error("The states of the files cannot be read.")
+    {
+    }
+};
+
+/// The states of all files, ignored ones left out.
+/// @throws StatesUnknown
+inline vclink::FileStateMap readStates(vclink::CMAdapter &adapter)
+{
+    vclink::FileStateMap states = adapter.getFolderStates(adapter.getRootFolder());
+    if (!states.empty())
+        return states;
+    bool hasFiles = false;
+    try
+    {
+        const std::string emptyTree = "4b825dc642cb6eb9a060e54bf8d69288fbee4904";
+        const auto branches = vclink::git::BranchManager::create(adapter);
+        hasFiles = branches->getRevision("HEAD^{tree}") != emptyTree;
+    }
+    catch (const vclink::git::LibGit2Exception &)
+    {
+        // There is no commit yet.
+    }
+    if (hasFiles)
+        throw StatesUnknown();
+    return states;
+}
+
 /// The files that have to be resolved before a commit; in the order of FileStateMap.
+/// @throws StatesUnknown
 inline std::vector<upath> filesInConflict(vclink::CMAdapter &adapter)
 {
     std::vector<upath> files;
-    for (const auto &[path, state] : adapter.getFolderStates(adapter.getRootFolder()))
+    for (const auto &[path, state] : readStates(adapter))
     {
         if (state.getState() == vclink::FileState::InConflict)
             files.push_back(path);

@@ -26,7 +26,7 @@ FileState stateOf(const FileStateMap &states, const upath &path)
 Rescue::Rescue(fs::path folder, CMAdapter &adapter, const std::vector<upath> &files)
     : folder_(std::move(folder)), root_(adapter.getRootFolder())
 {
-    const FileStateMap states = adapter.getFolderStates(root_);
+    const FileStateMap states = host_tools::readStates(adapter);
     fs::create_directories(folder_);
     fs::permissions(folder_, fs::perms::owner_all);
     for (const auto &path : files)
@@ -52,7 +52,7 @@ fs::path Rescue::copyOf(const Kept &kept) const
 
 std::vector<upath> Rescue::putBack(CMAdapter &adapter) const
 {
-    const FileStateMap states = adapter.getFolderStates(root_);
+    const FileStateMap states = host_tools::readStates(adapter);
     std::vector<upath> left;
     std::vector<upath> added;
     for (const auto &kept : files_)

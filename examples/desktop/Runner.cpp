@@ -7,6 +7,7 @@
 #include <QMetaObject>
 
 #include "language.hpp"
+#include "messages.hpp"
 #include "text.hpp"
 #include "vclink_host/cancellation.hpp"
 
@@ -123,7 +124,7 @@ void Runner::readAgain()
         [this, root = root_]
         {
             std::shared_ptr<const Snapshot> snapshot;
-            QString failure;
+            std::exception_ptr failure;
             try
             {
                 Work work(guards_, root,
@@ -133,14 +134,14 @@ void Runner::readAgain()
             }
             catch (...)
             {
-                failure = toQString(host_tools::describe(std::current_exception()).text);
+                failure = std::current_exception();
             }
             post(
                 [this, snapshot, failure]
                 {
                     isReading_ = false;
                     if (snapshot == nullptr)
-                        listener_.told(failure);
+                        listener_.told(textOf(host_tools::describe(failure)));
                     else if (snapshot->root == root_)
                         listener_.refreshed(snapshot);
                     readAgain();

@@ -4,6 +4,7 @@
 #include <set>
 
 #include "Work.hpp"
+#include "hostTools.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
 
 namespace vclink::desktop
@@ -77,7 +78,7 @@ Snapshot readSnapshot(Work &work)
     snapshot.localBranches = shortNames(manager->getLocalBranches(), "refs/heads/");
     snapshot.remoteBranches = shortNames(manager->getRemoteBranches(), "refs/remotes/");
     snapshot.repositoryState = manager->getRepositoryState();
-    snapshot.states = work.adapter().getFolderStates(work.root());
+    snapshot.states = host_tools::readStates(work.adapter());
     return snapshot;
 }
 

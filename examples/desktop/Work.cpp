@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "Work.hpp"
 
+#include <mutex>
 #include <utility>
 
 #include "vclink/git/GitAdapterFactory.hpp"

@@ -105,6 +105,8 @@ constexpr Words words[] = {
     {"Another program works here. Try again in a moment.",
      "Ein anderes Programm arbeitet hier gerade. Gleich noch einmal versuchen.",
      "ほかのプログラムが処理中です。しばらくしてから再試行してください。"},
+    {"The states of the files cannot be read.", "Der Zustand der Dateien ist nicht lesbar.",
+     "ファイルの状態を読み取れません。"},
     {"Files in conflict", "Dateien mit Konflikt", "競合しているファイル"},
     {"Ancestor", "Vorfahr", "共通の祖先"},
     {"Ours", "Unsere", "自分側"},

@@ -27,6 +27,14 @@ QMessageBox *makeBox(QWidget *parent, QMessageBox::Icon icon, const QString &tex
 
 } // namespace
 
+QString textOf(const host_tools::Failure &failure)
+{
+    // Those of the library are in the right language.
+    return failure.kind == host_tools::FailureKind::Other
+               ? say(fl::i18n::ustring_to_utf8(failure.text).c_str())
+               : toQString(failure.text);
+}
+
 void showMessage(QWidget *parent, const QString &text)
 {
     makeBox(parent, QMessageBox::Information, text)->open();
@@ -34,7 +42,7 @@ void showMessage(QWidget *parent, const QString &text)
 
 void showFailure(QWidget *parent, const QString &title, const host_tools::Failure &failure)
 {
-    auto *const box = makeBox(parent, QMessageBox::Warning, toQString(failure.text));
+    auto *const box = makeBox(parent, QMessageBox::Warning, textOf(failure));
     box->setWindowTitle(title);
     if (failure.isLocked())
         box->setInformativeText(say("Another program works here. Try again in a moment."));

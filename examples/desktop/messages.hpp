@@ -13,6 +13,7 @@ class QWidget;
 namespace vclink::desktop
 {
 
+QString textOf(const host_tools::Failure &failure);
 void showMessage(QWidget *parent, const QString &text);
 /// The library's text, with what helps by the kind of the failure, and details to unfold.
 void showFailure(QWidget *parent, const QString &title, const host_tools::Failure &failure);

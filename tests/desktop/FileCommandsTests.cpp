@@ -159,6 +159,24 @@ TEST_F(FileCommands, RevertIsRefusedIfNoCopyCanBeKept)
     EXPECT_EQ(repository_.read("a"), "second\n");
 }
 
+TEST_F(FileCommands, NothingIsRevertedOrCommittedIfTheStatesCannotBeRead)
+{
+    repository_.write("a", "second\n");
+    open();
+    select({"a"});
+    // libgit2 looks a submodule up for each folder that the index has as one.
+    repository_.git({"update-index", "--add", "--cacheinfo",
+                     "160000," + repository_.line({"rev-parse", "HEAD"}) + ",s"});
+    repository_.makeFolder("s");
+    repository_.write(".gitmodules", "[submodule\n");
+    choose("revert");
+    confirm();
+    EXPECT_EQ(takeMessage(), "The states of the files cannot be read.");
+    EXPECT_EQ(repository_.read("a"), "second\n");
+    choose("commit");
+    EXPECT_EQ(takeMessage(), "The states of the files cannot be read.");
+}
+
 TEST_F(FileCommands, CommitShowsTheIdentityAndTakesEveryChange)
 {
     repository_.write("a", "second\n");
