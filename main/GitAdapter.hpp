@@ -45,7 +45,7 @@ class GitAdapter : public vclink::CMAdapter
 
     /// A repository opened for the caller, who owns it.
     /// @throws LibGit2Exception
-    OwnedHandle<git_repository> getRepository() const;
+    [[nodiscard]] OwnedHandle<git_repository> getRepository() const;
     std::shared_ptr<GitOptionsFactory> getOptionsFactory() const;
     GitCallbacks &getCallbacks() const;
     std::shared_ptr<ApplicationInteractor> getInteractor() const;

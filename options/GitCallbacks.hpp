@@ -38,7 +38,7 @@ class GitCallbacks
 /// The sets that adapters and generators run with. Their pollers are connected to the host's source
 /// of cancellation from now until the end of the object.
 /// @param interactor not null
-std::unique_ptr<GitCallbacks>
+[[nodiscard]] std::unique_ptr<GitCallbacks>
 makeDefaultGitCallbacks(std::shared_ptr<ApplicationInteractor> interactor);
 
 } // namespace vclink::git

@@ -26,6 +26,6 @@ void reportCallbackException();
 /// thread's slot for GitErrorPolicy::throwIfError, and returns callbackErrorCode(). To be called
 /// inside a handler.
 /// @throws std::bad_alloc, and what the sinks raise
-int parkCallbackException();
+[[nodiscard]] int parkCallbackException();
 
 } // namespace vclink::git

@@ -17,7 +17,7 @@ class ScopeTrace
     /// @param path the function's source; kept as a pointer
     /// @param line the function's line in it
     /// @throws what the sinks raise; the scope is not counted then
-    ScopeTrace(Logger &target, const char *signature, const char *path, unsigned line)
+    [[nodiscard]] ScopeTrace(Logger &target, const char *signature, const char *path, unsigned line)
         : logger_(target), signature_(signature), path_(path), line_(line)
     {
         if (logger_.is_enabled(SeverityScopeEntry))

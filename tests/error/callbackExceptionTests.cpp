@@ -171,7 +171,7 @@ TEST_F(CallbackException, IsReportedNowhereWhenNothingIsEnabled)
     }
     catch (const std::runtime_error &)
     {
-        parkCallbackException();
+        static_cast<void>(parkCallbackException());
     }
     EXPECT_THAT(log.messages(), IsEmpty());
     EXPECT_NE(pendingCallbackException(), nullptr);

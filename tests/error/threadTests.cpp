@@ -91,7 +91,7 @@ int failOnce(int number)
     }
     catch (const OfThread &)
     {
-        parkCallbackException();
+        static_cast<void>(parkCallbackException());
     }
     try
     {

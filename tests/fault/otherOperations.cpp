@@ -65,7 +65,7 @@ Action createAttributes(const Subject &subject)
 {
     return [=]
     {
-        git::GitAttributes::create(*subject.adapter);
+        static_cast<void>(git::GitAttributes::create(*subject.adapter));
         return std::string();
     };
 }

@@ -103,13 +103,13 @@ TEST_F(BranchManagerObject, IsMadeForAGitAdapter)
 TEST_F(BranchManagerObject, IsMadeForNoOtherAdapter)
 {
     vclink::test::OtherAdapter other;
-    EXPECT_THROW(BranchManager::create(other), std::bad_cast);
+    EXPECT_THROW(static_cast<void>(BranchManager::create(other)), std::bad_cast);
 }
 
 TEST_F(BranchManagerObject, OpensNoRepositoryWhenItIsMade)
 {
     const auto adapter = makeAdapter(folder() / "missing");
-    EXPECT_NO_THROW(BranchManager::create(*adapter));
+    EXPECT_NO_THROW(static_cast<void>(BranchManager::create(*adapter)));
 }
 
 TEST_F(BranchManagerObject, SharesTheFactoryAndBorrowsTheCallbacks)

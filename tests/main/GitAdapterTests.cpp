@@ -91,7 +91,7 @@ TEST_F(GitAdapterTest, RaisesWhereItsRepositoryCannotBeOpened)
     const vclink::test::NoDescriptorLeak noLeak;
     try
     {
-        adapter->getRepository();
+        static_cast<void>(adapter->getRepository());
         FAIL() << "no exception";
     }
     catch (const LibGit2Exception &exception)

@@ -272,7 +272,8 @@ TEST_F(GitAttributesTest, FailsWhereTheRepositoryCannotBeOpened)
     repository_.remove(".git");
     EXPECT_EQ(libGit2FailureOf([&] { attributes->getAttribute(asPath("a"), u"x"); }).code,
               GIT_ENOTFOUND);
-    EXPECT_EQ(libGit2FailureOf([&] { GitAttributes::create(*adapter_); }).code, GIT_ENOTFOUND);
+    EXPECT_EQ(libGit2FailureOf([&] { static_cast<void>(GitAttributes::create(*adapter_)); }).code,
+              GIT_ENOTFOUND);
 }
 
 TEST_F(GitAttributesTest, LogsNothing)
@@ -294,7 +295,7 @@ TEST_F(GitAttributesTest, LeavesNoDescriptorOpen)
 TEST_F(GitAttributesTest, IsMadeForNoOtherAdapter)
 {
     vclink::test::OtherAdapter other;
-    EXPECT_THROW(GitAttributes::create(other), std::bad_cast);
+    EXPECT_THROW(static_cast<void>(GitAttributes::create(other)), std::bad_cast);
 }
 
 TEST_F(GitAttributesTest, HasItsOneOperationBehindTheDestructor)

@@ -85,7 +85,7 @@ class RemoteHeads : public vclink::test::RemoteTest, public testing::WithParamIn
 TEST_F(GitRemoteTest, TakesNoAdapterOfAnotherBackEnd)
 {
     vclink::test::OtherAdapter other;
-    EXPECT_THROW(git::GitRemote::create("origin", other), std::bad_cast);
+    EXPECT_THROW(static_cast<void>(git::GitRemote::create("origin", other)), std::bad_cast);
 }
 
 TEST_F(GitRemoteTest, SharesTheFactoryOfItsAdapter)

@@ -194,7 +194,8 @@ std::vector<NulCall> NulInTexts::callsOn(git::GitAdapter &adapter, const upath &
             {"fetch", [=] { remote->fetch({}); }},
             {"push", [=] { remote->push({u"refs/heads/topic:refs/heads/topic"}); }},
             {"getRemoteHeads", [=] { remote->getRemoteHeads(); }},
-            {"GitAttributes::create", [&adapter] { git::GitAttributes::create(adapter); }}};
+            {"GitAttributes::create",
+             [&adapter] { static_cast<void>(git::GitAttributes::create(adapter)); }}};
 }
 
 TEST_F(NulInTexts, AreRefusedAndNothingChanges)

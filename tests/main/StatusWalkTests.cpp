@@ -136,7 +136,7 @@ TEST_F(StatusWalk, OpensTheRootItselfWithoutASearch)
             EXPECT_EQ(ceilings, nullptr);
         });
     query();
-    adapter_->getRepository();
+    static_cast<void>(adapter_->getRepository());
     EXPECT_THAT(paths, ElementsAre(repository_.path().string(), repository_.path().string()));
 }
 

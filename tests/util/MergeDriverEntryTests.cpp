@@ -393,7 +393,7 @@ TEST(MergeDriverGuard, LooksAtNoResult)
     for (const int code : {GIT_ERROR, GIT_EEXISTS, GIT_ENOTFOUND})
     {
         calls.fail({{"git_merge_driver_register", code}, {"git_merge_driver_unregister", code}});
-        EXPECT_NO_THROW(git::LibGit2Guard());
+        EXPECT_NO_THROW(const git::LibGit2Guard guard);
     }
 }
 

@@ -34,7 +34,7 @@ class VCLINK_GIT_EXPORT BranchManager
 
     /// @param adapter one that GitAdapterFactory has made; must outlive the manager
     /// @throws std::bad_cast for any other adapter
-    static std::unique_ptr<BranchManager> create(vclink::CMAdapter &adapter);
+    [[nodiscard]] static std::unique_ptr<BranchManager> create(vclink::CMAdapter &adapter);
 
     BranchManager() = default;
     BranchManager(const BranchManager &) = delete;

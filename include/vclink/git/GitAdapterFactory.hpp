@@ -90,14 +90,14 @@ class VCLINK_GIT_EXPORT GitAdapterFactory : public vclink::CMAdapterFactory
     /// @param root the root of the working tree
     /// @param interactor not null; shared for the adapter's life
     /// @throws std::bad_alloc
-    std::unique_ptr<CMAdapter>
+    [[nodiscard]]     std::unique_ptr<CMAdapter>
     createAdapterFor(const upath &root,
                      std::shared_ptr<ApplicationInteractor> interactor) const override;
 
     /// A GitWorkingCopyGenerator, which the host owns. Nothing is opened.
     /// @param interactor not null; shared for the generator's life
     /// @throws std::bad_alloc
-    std::unique_ptr<WorkingCopyGenerator>
+    [[nodiscard]]     std::unique_ptr<WorkingCopyGenerator>
     createWorkingCopyGenerator(std::shared_ptr<ApplicationInteractor> interactor) const override;
 
     /// Whether this very folder is a Git repository, with or without a working tree. A folder

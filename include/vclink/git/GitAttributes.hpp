@@ -21,7 +21,7 @@ class VCLINK_GIT_EXPORT GitAttributes
     /// @param adapter one that GitAdapterFactory has made; must outlive the object
     /// @throws std::bad_cast for any other adapter
     /// @throws LibGit2Exception when the repository can't be opened
-    static std::unique_ptr<GitAttributes> create(vclink::CMAdapter &adapter);
+    [[nodiscard]] static std::unique_ptr<GitAttributes> create(vclink::CMAdapter &adapter);
 
     GitAttributes() = default;
     GitAttributes(const GitAttributes &) = delete;

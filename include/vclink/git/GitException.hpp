@@ -34,7 +34,7 @@ class VCLINK_GIT_EXPORT GitException : public foundation::core::except::IMsgIDEx
     ~GitException() noexcept override;
 
     /// A copy on the heap, which the caller owns.
-    const GitException *clone() const override;
+    [[nodiscard]] const GitException *clone() const override;
     /// Throws a copy of this class.
     void rethrow() const override;
 

@@ -29,10 +29,10 @@ class VCLINK_GIT_EXPORT GitOptionsFactory
     virtual ~GitOptionsFactory();
 
     /// A factory that leaves nested values as their outer value's constructor made them.
-    static std::unique_ptr<GitOptionsFactory>
+    [[nodiscard]] static std::unique_ptr<GitOptionsFactory>
     makeUninitialized(std::shared_ptr<ApplicationInteractor> interactor);
     /// A factory that composes nested values of their own defaults; what adapters run with.
-    static std::unique_ptr<GitOptionsFactory>
+    [[nodiscard]] static std::unique_ptr<GitOptionsFactory>
     makeDefault(std::shared_ptr<ApplicationInteractor> interactor);
 
     /// For a clone.

@@ -37,7 +37,8 @@ class VCLINK_GIT_EXPORT GitRemote
     /// @param name the remote's name, UTF-8, e.g. "origin"
     /// @param adapter one that GitAdapterFactory has made; must outlive the object
     /// @throws std::bad_cast for any other adapter
-    static std::unique_ptr<GitRemote> create(const std::string &name, vclink::CMAdapter &adapter);
+    [[nodiscard]] static std::unique_ptr<GitRemote> create(const std::string &name,
+                                                           vclink::CMAdapter &adapter);
 
     GitRemote() = default;
     GitRemote(const GitRemote &) = delete;

@@ -20,7 +20,7 @@ class VCLINK_GIT_EXPORT LibGit2Exception : public GitException
     ~LibGit2Exception() noexcept override;
 
     /// A copy on the heap, which the caller owns.
-    const LibGit2Exception *clone() const override;
+    [[nodiscard]] const LibGit2Exception *clone() const override;
     /// Throws a copy of this class.
     void rethrow() const override;
 

@@ -35,7 +35,7 @@ class GitMergeDriverLookup;
 class VCLINK_GIT_EXPORT LibGit2Guard
 {
   public:
-    LibGit2Guard();
+    [[nodiscard]] LibGit2Guard();
     LibGit2Guard(const LibGit2Guard &) = delete;
     LibGit2Guard &operator=(const LibGit2Guard &) = delete;
     ~LibGit2Guard();
