@@ -24,7 +24,7 @@ class IndexLock;
 struct MergeSides;
 
 /// The back end of one working copy. Holds what it needs to open the repository and to build option
-/// records, and nothing of the repository itself. See GitAdapterFactory::createAdapterFor.
+/// records, and nothing of the repository itself.
 class GitAdapter : public vclink::CMAdapter
 {
   public:
@@ -34,6 +34,9 @@ class GitAdapter : public vclink::CMAdapter
     GitAdapter(const upath &root, std::shared_ptr<GitOptionsFactory> factory);
     ~GitAdapter() override;
 
+    /// What each operation promises: the page adapter_operations in
+    /// vclink/git/GitAdapterFactory.hpp, a section for each.
+    /// @{
     void commit(const upath &folder, const ustring &message) override;
     void addFiles(const std::vector<upath> &files) override;
     void removeFiles(const std::vector<upath> &files) override;
@@ -42,6 +45,7 @@ class GitAdapter : public vclink::CMAdapter
     FileStateMap getFileStates(const std::vector<upath> &files) override;
     FileStateMap getFolderStates(const upath &folder) override;
     const upath &getRootFolder() override;
+    /// @}
 
     /// A repository opened for the caller, who owns it.
     /// @throws LibGit2Exception
