@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: MIT
+// GitAdapter::commit: a commit of all tracked files, which also concludes a merge.
 #include <string>
 #include <vector>
 

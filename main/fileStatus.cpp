@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: MIT
+// GitAdapter::getFileStates and getFolderStates: one status walk each.
 #include <memory>
 #include <utility>
 

@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: MIT
+// GitAdapter::revertFiles: the index back to HEAD, then the files back to the index.
 #include <algorithm>
 #include <cstddef>
 #include <memory>

@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: MIT
+// GitAdapter::addFiles, removeFiles and markResolved: changes of the index alone.
 #include <git2/index.h>
 
 #include "error/errorUtil/GitResult.hpp"

@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: MIT
+// BranchMerger::threeWayMerge: git_merge, and what follows it with and without conflicts.
 #include <optional>
 
 #include <git2/annotated_commit.h>
