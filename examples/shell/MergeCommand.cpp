@@ -25,6 +25,9 @@ namespace vclink::shell
 namespace
 {
 
+/// GIT_ECONFLICT.
+constexpr int wouldLoseWork = -13;
+
 bool isInOrder(const git::BranchManager &manager)
 {
     return manager.getRepositoryState() == "Normal";
@@ -81,6 +84,11 @@ class MergeCommand : public Command
         else if (!isInOrder(*manager))
         {
             tellWayOn(session.adapter(), notes);
+        }
+        else if (notes.failure == wouldLoseWork)
+        {
+            complain("Nothing was merged. Commit the changes that would be lost, or move the files "
+                     "out of the way, and\nmerge again.");
         }
         return status;
     }

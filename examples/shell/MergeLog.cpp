@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "MergeLog.hpp"
 
+#include <charconv>
 #include <string_view>
 
 #include "severities.hpp"
@@ -21,6 +22,19 @@ std::string_view driverOf(std::string_view record)
     return isOne ? record.substr(begin.size(), place - begin.size()) : std::string_view();
 }
 
+/// Of "Throwing error TEXT (CODE)" the code; 0 for other records.
+int codeOf(std::string_view record)
+{
+    constexpr std::string_view begin = "Throwing error ";
+    const std::size_t place = record.rfind('(');
+    int code = 0;
+    if (record.substr(0, begin.size()) == begin && place != std::string_view::npos)
+    {
+        std::from_chars(record.data() + place + 1, record.data() + record.size(), code);
+    }
+    return code;
+}
+
 } // namespace
 
 void takeNote(MergeNotes &notes, const std::string &record)
@@ -33,6 +47,10 @@ void takeNote(MergeNotes &notes, const std::string &record)
     else if (record == "Auto-merge unsuccessful")
     {
         ++notes.refusals[notes.driver];
+    }
+    else if (const int code = codeOf(record); code != 0)
+    {
+        notes.failure = code;
     }
 }
 

@@ -10,9 +10,11 @@
 namespace vclink::shell
 {
 
-/// What became known of the commands that a merge ran.
+/// What became known of a merge.
 struct MergeNotes
 {
+    /// libgit2's code of the last failure; 0 if there was none
+    int failure = 0;
     /// the driver whose command ran last
     std::string driver;
     /// how many files the command of each driver has refused
@@ -22,8 +24,9 @@ struct MergeNotes
 /// Takes the note that a record of the library's log is of, if it is of any.
 void takeNote(MergeNotes &notes, const std::string &record);
 
-/// While it lives, takes notes from the library's log: the back end does not tell which commands
-/// have refused a file. At most one object at a time.
+/// While it lives, takes notes from the library's log: the back end tells its caller neither which
+/// commands have refused a file nor libgit2's code of a merge that failed. At most one object at a
+/// time.
 class MergeLog
 {
   public:
