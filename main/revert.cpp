@@ -60,9 +60,9 @@ bool areIndexed(git_index *index, const std::vector<std::string> &names)
                        { return git_index_get_bypath(index, name.c_str(), 0) != nullptr; });
 }
 
-/// A file that is put back takes what was staged below its name out of the index. libgit2 then goes
-/// on to take these entries out as well, which it can't, and gives up in the midst of the list:
-/// what is done by then need not be done again.
+/// A file that is put back takes what was staged below its name out of the index, if these entries
+/// are the index's first. libgit2 then fails to take them out once more, and gives up in the midst
+/// of the list: what is done by then need not be done again.
 bool isHalfDone(const GitResult<void> &reset)
 {
     return reset.has_error() && reset.error().getCode() == GIT_ENOTFOUND &&

@@ -107,21 +107,25 @@ TEST_F(RevertedKinds, MakesAFileAgainOfAFolder)
     expectRevertsAsGit({"file"});
 }
 
+/// libgit2 stumbles over a folder whose entries are the first of the index.
 TEST_F(RevertedKinds, MakesALinkAgainOfAStagedFolder)
 {
-    for (const std::string target : {"file", "sub", "nowhere"})
+    for (const std::string name : {"a first", "link"})
     {
-        repository_.symlink(target, "link");
-        repository_.commitAll("link to " + target);
-        repository_.remove("link");
-        repository_.write("link/a", "x");
-        repository_.write("link/deep/b", "x");
-        repository_.add({"."});
-        repository_.write("link/untracked", "x");
-        expectRevertsAsGit({"link"});
-        EXPECT_THAT(status(), ElementsAre());
-        EXPECT_EQ(fs::read_symlink(repository_ / "link"), target);
-        repository_.remove("link");
+        for (const std::string target : {"file", "sub", "nowhere"})
+        {
+            repository_.symlink(target, name);
+            repository_.commitAll("link to " + target);
+            repository_.remove(name);
+            repository_.write(name + "/a", "x");
+            repository_.write(name + "/deep/b", "x");
+            repository_.add({"."});
+            repository_.write(name + "/untracked", "x");
+            expectRevertsAsGit({name});
+            EXPECT_THAT(status(), ElementsAre());
+            EXPECT_EQ(fs::read_symlink(repository_ / name), target);
+            repository_.remove(name);
+        }
     }
 }
 
