@@ -96,7 +96,8 @@ void IndexCopy::copyFrom(const FileDescriptor &source)
         raiseUncopied(errno, path_);
     }
     copyContent(source, static_cast<std::size_t>(status.st_size));
-    const std::array<timespec, 2> times{timespec{0, UTIME_OMIT}, status.st_mtim};
+    const std::array<timespec, 2> times{timespec{0, UTIME_OMIT},
+                                        timespec{status.st_mtim.tv_sec, 0}};
     if (::futimens(copy_.get(), times.data()) != 0 || ::fstat(copy_.get(), &copied_) != 0)
     {
         raiseUncopied(errno, path_);

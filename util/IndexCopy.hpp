@@ -15,7 +15,9 @@ namespace vclink::git
 class IndexCopy
 {
   public:
-    /// Copies the file with its modification time, so that the same entries are racy. Without an
+    /// Copies the file with the second of its modification time. Entries of that second count as
+    /// racy then, to libgit2 as they do to a git that compares no fractions, as it is usually
+    /// built: else libgit2 would not mark an edit of that second, and git never see it. Without an
     /// index there is no copy either: libgit2 knows the first checkout of a repository by that.
     /// Removes an earlier copy that a killed operation has left.
     /// @param index its path, no symbolic link

@@ -225,6 +225,7 @@ TEST_F(SwitchObstacles, AreNotStagedChangesThatTheBranchHasAsWell)
     makeTopic(writing("d/f", "theirs\n"));
     repository_.write("d/f", "theirs\n");
     repository_.add({"d/f"});
+    repository_.write("d/f", "f\n");
     repository_.write("other", "staged\n");
     repository_.add({"other"});
     expectSwitches();

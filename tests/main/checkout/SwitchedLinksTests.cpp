@@ -98,6 +98,16 @@ TEST_F(SwitchedLinks, RefusesALinkThatIsDeeperDown)
     EXPECT_FALSE(fs::exists(folder() / "outside/dir/deep/new"));
 }
 
+TEST_F(SwitchedLinks, RefusesALinkFarAboveThatLeadsToNothingOfThatName)
+{
+    makeBranch("deep", [this] { repository_.write("dir/deep/new", "x"); });
+    fs::create_directory(folder() / "empty");
+    repository_.remove("dir");
+    repository_.symlink("../empty", "dir");
+    expectRefused("deep", inTheWay("dir"));
+    EXPECT_TRUE(fs::is_empty(folder() / "empty"));
+}
+
 /// libgit2 is past the link with the first of these, and sees no conflict in the second.
 TEST_F(SwitchedLinks, RefusesALinkThatLibGit2IsPast)
 {
