@@ -250,6 +250,15 @@ TEST_F(MergeObstacles, NameTheFirstFile)
     expectEditRefused("d/g");
 }
 
+TEST_F(MergeObstacles, NameTheFirstFileWhateverIsFoundFirst)
+{
+    theyWrite({"d/new"});
+    repository_.write("d/new", "mine\n");
+    repository_.git({"update-index", "--skip-worktree", "other"});
+    repository_.write("other", "mine\n");
+    expectMergeRefused(inTheWay("untracked file 'd/new'"));
+}
+
 TEST_F(MergeObstacles, AreLinksAndFilesInThePlaceOfATrackedFolder)
 {
     theyWriteElsewhere();
@@ -406,6 +415,12 @@ TEST_F(MergeObstacles, AreLinksInThePlaceOfHiddenFiles)
     expectHiddenEditRefused("d/f", "skip-worktree");
     repository_.remove("d/f");
     makeFifo(repository_ / "d/f");
+    expectHiddenEditRefused("d/f", "skip-worktree");
+    repository_.remove("d/f");
+    repository_.write("d/f/mine", "mine\n");
+    expectHiddenEditRefused("d/f", "skip-worktree");
+    repository_.remove("d");
+    repository_.symlink("../outside", "d");
     expectHiddenEditRefused("d/f", "skip-worktree");
 }
 

@@ -4,6 +4,7 @@
 #include <memory>
 #include <string>
 
+#include <git2/errors.h>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
@@ -21,6 +22,7 @@ using testing::ElementsAre;
 using testing::IsEmpty;
 using vclink::test::GitRepository;
 using vclink::test::LibGit2Failure;
+using vclink::test::libGit2FailureOf;
 using vclink::test::makeFifo;
 using vclink::test::makeSocket;
 using vclink::util::exception::CancelledOperationException;
@@ -230,6 +232,17 @@ TEST_F(SwitchObstacles, AreNotStagedChangesThatTheBranchHasAsWell)
     repository_.add({"other"});
     expectSwitches();
     EXPECT_THAT(status(), ElementsAre("M  other"));
+}
+
+/// Without an index everything is untracked.
+TEST_F(SwitchObstacles, AreFilesOfAWorkingCopyThatWasNeverCheckedOut)
+{
+    makeTopic(writing("d/f", "theirs\n"));
+    repository_.remove(".git/index");
+    repository_.write("other", "mine\n");
+    EXPECT_EQ(libGit2FailureOf([this] { branches().switchBranch("topic"); }).code, GIT_ECONFLICT);
+    EXPECT_EQ(repository_.read("other"), "mine\n");
+    EXPECT_EQ(currentBranch(), "refs/heads/main");
 }
 
 TEST_F(SwitchObstacles, AreSubmodulesThatBecomeAFile)
