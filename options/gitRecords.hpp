@@ -29,7 +29,7 @@ template <class Record, class Version>
 Record initGitRecord(int (*init)(Record *, Version), Version version)
 {
     Record record{};
-    makeResult(init(&record, version)).value();
+    check(makeResult(init(&record, version)));
     return record;
 }
 

@@ -28,15 +28,29 @@ inline GitResult<void> makeResult(int code)
     return boost::outcome_v2::success();
 }
 
-/// Calls a libgit2 function that gives nothing but its code. libgit2 fails without a text in places,
-/// and leaves a text where it goes on from a failure of its own. Its record is emptied before the
-/// call, so that the error never has the text of an earlier one.
+/// Calls a libgit2 function that gives nothing but its code. libgit2 fails without a text in
+/// places, and leaves a text where it goes on from a failure of its own. Its record is emptied
+/// before the call, so that the error never has the text of an earlier one.
 /// @throws std::bad_alloc
 template <class Function, class... Arguments>
 GitResult<void> call(Function function, Arguments... arguments)
 {
     git_error_clear();
     return makeResult(function(arguments...));
+}
+
+/// For a result that has no value: throws its failure, if it is one.
+inline void check(const GitResult<void> &result)
+{
+    result.value();
+}
+
+/// call() of a function that must succeed.
+/// @throws what GitErrorPolicy throws for a failure, std::bad_alloc
+template <class Function, class First, class... Arguments>
+void check(Function function, First first, Arguments... arguments)
+{
+    check(call(function, first, arguments...));
 }
 
 /// As call(), for a function whose first argument is the address of a handle; owns the handle from

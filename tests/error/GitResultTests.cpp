@@ -164,6 +164,32 @@ TEST(GitResult, OfAFailureRaisesItWhenAskedForItsValue)
     }
 }
 
+TEST(GitCheck, RaisesTheFailureOfItsCall)
+{
+    const HermeticLibGit2 libgit2;
+    const char *const none = nullptr;
+    EXPECT_NO_THROW(check(answerWith, 0, none));
+    try
+    {
+        check(answerWith, GIT_ELOCKED, "locked");
+        ADD_FAILURE() << "nothing was raised";
+    }
+    catch (const LibGit2Exception &exception)
+    {
+        EXPECT_EQ(exception.getError().getCode(), GIT_ELOCKED);
+        EXPECT_EQ(exception.getError().getMessage(), u"locked");
+    }
+}
+
+TEST(GitCheck, LeavesASuccessAloneAndRaisesAFailureThatIsThereAlready)
+{
+    const HermeticLibGit2 libgit2;
+    const LogCapture log;
+    EXPECT_NO_THROW(check(makeResult(0)));
+    EXPECT_THAT(log.messages(), IsEmpty());
+    EXPECT_THROW(check(makeResult(GIT_ERROR)), LibGit2Exception);
+}
+
 TEST(GitResult, RaisesNothingBeforeItIsAsked)
 {
     const LogCapture log;
