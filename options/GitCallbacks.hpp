@@ -4,13 +4,29 @@
 #include <memory>
 
 #include "options/CheckoutCallbacks.hpp"
-#include "options/ProxyCallbacks.hpp"
 #include "options/RemoteCallbacks.hpp"
-#include "options/ReservedCallbacks.hpp"
 #include "vclink/ApplicationInteractor.hpp"
 
 namespace vclink::git
 {
+
+/// A set without callbacks, which keeps its place in GitCallbacks.
+class ReservedCallbacks
+{
+  public:
+    /// @param interactor outlives the set
+    explicit ReservedCallbacks(ApplicationInteractor &interactor) : interactor_(interactor)
+    {
+    }
+
+  private:
+    [[maybe_unused]] ApplicationInteractor &interactor_;
+};
+
+/// A set without callbacks: no proxy is ever asked about.
+class ProxyCallbacks
+{
+};
 
 /// The callback sets of one adapter or generator. libgit2's records point at the sets, so the
 /// object outlives every call that such a record is given to.
