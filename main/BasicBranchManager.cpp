@@ -110,6 +110,7 @@ void BasicBranchManager::switchBranch(const BranchName &name)
     watch.lookBeforeSwitch(target.get());
     awaitUnlocked(repository.get(), "HEAD");
     call(git_checkout_tree, repository.get(), target.get(), &record).value();
+    watch.settleSubmodules();
     lock.publish();
     // Only now, so that a checkout that fails leaves HEAD where it was.
     const char *const head = git_reference_name(branch.get());

@@ -150,6 +150,7 @@ void BranchMerger::fastForward(git_repository *repository, git_annotated_commit 
     // As it was looked at: what comes later, libgit2 finds when it moves the branch.
     headThen.refuseMoved(repository);
     call(git_checkout_tree, repository, target.get(), &record).value();
+    watch.settleSubmodules();
     lock.publish();
     // Only now, so that a checkout that fails leaves the branch where it was.
     retryWhileLocked(

@@ -1,6 +1,9 @@
 // SPDX-License-Identifier: MIT
 // BranchMerger::threeWayMerge: git_merge, and what follows it with and without conflicts.
+#include <filesystem>
 #include <optional>
+#include <string>
+#include <system_error>
 
 #include <git2/annotated_commit.h>
 #include <git2/attr.h>
@@ -9,6 +12,7 @@
 #include <git2/index.h>
 #include <git2/merge.h>
 #include <git2/refs.h>
+#include <git2/repository.h>
 
 #include "error/errorUtil/GitResult.hpp"
 #include "error/errorUtil/gitString.hpp"
@@ -49,6 +53,18 @@ bool isUnmergeable(git_repository *repository, const char *path)
            (text == GIT_ATTR_VALUE_FALSE && merge == GIT_ATTR_VALUE_STRING);
 }
 
+/// libgit2 removes the folder of a submodule in conflict if it is empty, since the submodule is not
+/// populated. A commit would take the submodule for deleted.
+void bringFolderBack(git_repository *repository, const git_index_entry *ours)
+{
+    if (ours != nullptr && ours->mode == GIT_FILEMODE_COMMIT)
+    {
+        std::error_code stays;
+        std::filesystem::create_directories(
+            git_repository_workdir(repository) + std::string(ours->path), stays);
+    }
+}
+
 std::vector<ustring> listUnmergeable(git_repository *repository, git_index *index)
 {
     const OwnedHandle<git_index_conflict_iterator> iterator =
@@ -69,6 +85,7 @@ std::vector<ustring> listUnmergeable(git_repository *repository, git_index *inde
         collectUnmergeable(repository, paths, ancestor);
         collectUnmergeable(repository, paths, ours);
         collectUnmergeable(repository, paths, theirs);
+        bringFolderBack(repository, ours);
     }
 }
 
@@ -118,6 +135,7 @@ void BranchMerger::threeWayMerge(const BranchName &name, git_repository *reposit
     marker.emplace(repository, sides);
     call(git_merge, repository, heads, 1, &mergeRecord, &checkoutRecord).value();
     restoreMergeHead(repository, sides.theirs);
+    watch.settleSubmodules();
     const OwnedHandle<git_index> index = getRepositoryIndex(repository);
     if (git_index_has_conflicts(index.get()) != 0)
     {

@@ -11,6 +11,7 @@
 #include "error/errorUtil/GitResult.hpp"
 #include "error/errorUtil/callbackException.hpp"
 #include "error/errorUtil/setGitError.hpp"
+#include "main/checkout/gitlinks.hpp"
 #include "main/checkout/obstaclesAhead.hpp"
 #include "util/repository.hpp"
 
@@ -22,10 +23,13 @@ namespace
 using ChangeRule = Finding (*)(WorkingCopy &, const TreeChange &);
 using NoticeRule = Finding (*)(WorkingCopy &, const CheckoutNotice &);
 
-constexpr std::array<ChangeRule, 6> switchRules{findBlockedWay,    findSpecialFile,
-                                                findIgnoredLink,   findForeignInFolder,
-                                                findMissingFolder, findSubmodule};
-constexpr std::array<ChangeRule, 2> mergeRules{findBlockedWayOfMerge, findUntracked};
+constexpr std::array<ChangeRule, 9> switchRules{
+    findBlockedWay,       findSpecialFile,      findIgnoredLink,
+    findForeignInFolder,  findMissingFolder,    findSubmodule,
+    findFileForSubmodule, findFolderOfOtherUse, findStagedBelowSubmodule};
+constexpr std::array<ChangeRule, 2> stagedRules{findStagedSubmodule, findStagedContent};
+constexpr std::array<ChangeRule, 3> mergeRules{findBlockedWayOfMerge, findUntracked,
+                                               findFileForSubmodule};
 constexpr std::array<NoticeRule, 2> switchNoticeRules{findUnseen, findMissingFile};
 constexpr std::array<NoticeRule, 7> mergeNoticeRules{
     findEdit,          findUnseen,           findUntrackedNoticed, findForeignInFolderNoticed,
@@ -145,13 +149,22 @@ void CheckoutWatch::lookBeforeSwitch(const git_object *target)
                          found = ask(switchRules, copy, change);
                          if (!found && !isForced_)
                          {
-                             found = findStagedContent(copy, change);
+                             found = ask(stagedRules, copy, change);
+                         }
+                         if (!found && switched_.note(copy, change) && isForced_)
+                         {
+                             found = inTheWay(change.path, Standing::Folder);
                          }
                          return !found;
                      });
     if (found)
     {
         refuse(*found);
+    }
+    if (!switched_.isEmpty())
+    {
+        baseline_ = switched_.makeBaseline(copy);
+        record_.baseline_index = baseline_.get();
     }
 }
 
@@ -172,6 +185,7 @@ void CheckoutWatch::lookBeforeMerge(const git_oid *theirs)
                          [&](const TreeChange &change)
                          {
                              found = ask(mergeRules, copy, change);
+                             merged_.noteChange(copy, change);
                              return !found;
                          });
         first = firstOf(first, found);
@@ -180,6 +194,19 @@ void CheckoutWatch::lookBeforeMerge(const git_oid *theirs)
     {
         refuse(*first);
     }
+    merged_.stage(copy.index());
+}
+
+void CheckoutWatch::settleSubmodules() const
+{
+    if (switched_.isEmpty() && merged_.isEmpty())
+    {
+        return;
+    }
+    const OwnedHandle<git_index> index = getRepositoryIndex(repository_);
+    switched_.settle(index.get());
+    merged_.settle(index.get());
+    writeIndex(index.get());
 }
 
 void CheckoutWatch::refuse(const Obstacle &obstacle)
@@ -244,8 +271,20 @@ Finding CheckoutWatch::judge(const CheckoutNotice &notice)
     if (!found)
     {
         makeWay(notice);
+        noteUntracked(notice);
     }
     return found;
+}
+
+void CheckoutWatch::noteUntracked(const CheckoutNotice &notice)
+{
+    std::string name = notice.path;
+    const bool isFolder = !name.empty() && name.back() == '/';
+    if (kind_ == CheckoutKind::Merge && notice.why == GIT_CHECKOUT_NOTIFY_UNTRACKED && isFolder)
+    {
+        name.pop_back();
+        merged_.noteUntracked(*copy_, name);
+    }
 }
 
 /// Removes what no rule keeps and libgit2 would go through or fail at, where a new file comes: an
@@ -253,7 +292,7 @@ Finding CheckoutWatch::judge(const CheckoutNotice &notice)
 void CheckoutWatch::makeWay(const CheckoutNotice &notice)
 {
     if (notice.why != GIT_CHECKOUT_NOTIFY_UPDATED || notice.baseline != nullptr ||
-        notice.target == nullptr || notice.target->mode == GIT_FILEMODE_COMMIT)
+        notice.target == nullptr || isGitlink(notice.target))
     {
         return;
     }
@@ -299,8 +338,12 @@ Finding CheckoutWatch::clearAll(const CheckoutNotice &notice)
         }
     }
     const Standing standing = standingAt(root_ + name);
-    const bool isFolder =
-        standing == Standing::Folder && isPast && notice.target->mode != GIT_FILEMODE_COMMIT;
+    const bool isSubmodule = isGitlink(notice.target);
+    if (isSubmodule && standing == Standing::File)
+    {
+        return inTheWay(name, standing);
+    }
+    const bool isFolder = standing == Standing::Folder && isPast && !isSubmodule;
     if (isFolder || standing == Standing::Link || standing == Standing::Special)
     {
         cleared_.remove(root_ + name);

@@ -7,8 +7,11 @@
 #include <git2/checkout.h>
 #include <git2/types.h>
 
+#include "error/errorUtil/GitDeleters.hpp"
 #include "main/checkout/ClearedWay.hpp"
+#include "main/checkout/MergeSubmodules.hpp"
 #include "main/checkout/Obstacle.hpp"
+#include "main/checkout/SwitchSubmodules.hpp"
 #include "main/checkout/WorkingCopy.hpp"
 #include "main/checkout/noticedObstacles.hpp"
 
@@ -57,6 +60,12 @@ class CheckoutWatch
     /// As lookBeforeSwitch, before the commit `theirs` is merged into HEAD.
     void lookBeforeMerge(const git_oid *theirs);
 
+    /// To be called after the checkout or the merge that was looked at before: the entries of
+    /// submodules in the index become what the target or the merge has, while their folders stay.
+    /// Writes the index if there is anything to change.
+    /// @throws LibGit2Exception
+    void settleSubmodules() const;
+
   private:
     static int pass(git_checkout_notify_t why, const char *path, const git_diff_file *baseline,
                     const git_diff_file *target, const git_diff_file *workdir,
@@ -65,6 +74,7 @@ class CheckoutWatch
     Finding judge(const CheckoutNotice &notice);
     void makeWay(const CheckoutNotice &notice);
     WorkingCopy &lookAtWorkingCopy();
+    void noteUntracked(const CheckoutNotice &notice);
     Finding clearAll(const CheckoutNotice &notice);
     void refuse(const Obstacle &obstacle);
 
@@ -77,6 +87,10 @@ class CheckoutWatch
     std::string root_;
     /// Empty until the look before; a revert needs none.
     std::optional<WorkingCopy> copy_;
+    SwitchSubmodules switched_;
+    MergeSubmodules merged_;
+    /// The record's, while a switch keeps submodules.
+    OwnedHandle<git_index> baseline_;
     bool hasHeard_ = false;
     /// What libgit2 itself replaces, as the last notification with something there has told.
     std::string replaced_;

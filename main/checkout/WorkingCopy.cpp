@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "main/checkout/WorkingCopy.hpp"
 
+#include <cstddef>
 #include <filesystem>
 #include <memory>
 #include <utility>
@@ -123,6 +124,11 @@ const git_index_entry *WorkingCopy::entryOf(const std::string &name) const
     return git_index_get_bypath(index_.get(), name.c_str(), 0);
 }
 
+bool WorkingCopy::isInHead(const std::string &name) const
+{
+    return typeInHead(name) != GIT_OBJECT_INVALID;
+}
+
 bool WorkingCopy::isFolderInHead(const std::string &name) const
 {
     return typeInHead(name) == GIT_OBJECT_TREE;
@@ -144,6 +150,21 @@ std::string WorkingCopy::foreignBelow(const std::string &folder) const
         }
     }
     return error ? folder : "";
+}
+
+std::string WorkingCopy::stagedBelow(const std::string &folder) const
+{
+    const std::string prefix = folder + '/';
+    const std::size_t count = git_index_entrycount(index_.get());
+    for (std::size_t i = 0; i < count; ++i)
+    {
+        const char *const name = git_index_get_byindex(index_.get(), i)->path;
+        if (prefix.compare(0, prefix.size(), name, 0, prefix.size()) == 0 && !isInHead(name))
+        {
+            return name;
+        }
+    }
+    return {};
 }
 
 bool WorkingCopy::isIgnored(const std::string &name) const

@@ -55,11 +55,15 @@ class WorkingCopy
 
     /// The index's entry, null if there is none that is merged.
     const git_index_entry *entryOf(const std::string &name) const;
+    bool isInHead(const std::string &name) const;
     /// Whether HEAD has a folder of this name.
     bool isFolderInHead(const std::string &name) const;
     /// The first thing in the folder, at any depth, that HEAD does not have: untracked, ignored or
     /// added to the index. Empty if there is none.
     std::string foreignBelow(const std::string &folder) const;
+    /// The first name below the folder that the index has and HEAD does not. Empty if there is
+    /// none.
+    std::string stagedBelow(const std::string &folder) const;
     /// git_ignore_path_is_ignored.
     bool isIgnored(const std::string &name) const;
     /// Whether the file, link or folder differs from its entry in the index, by content. A missing

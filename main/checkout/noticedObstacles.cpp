@@ -4,17 +4,13 @@
 #include <git2/diff.h>
 #include <sys/stat.h>
 
+#include "main/checkout/gitlinks.hpp"
 #include "main/checkout/obstaclesAhead.hpp"
 
 namespace vclink::git
 {
 namespace
 {
-
-bool isGitlink(const git_diff_file *file)
-{
-    return file != nullptr && file->mode == GIT_FILEMODE_COMMIT;
-}
 
 bool isFolder(const git_diff_file *file)
 {

@@ -6,6 +6,7 @@
 #include <git2/tree.h>
 #include <sys/stat.h>
 
+#include "main/checkout/gitlinks.hpp"
 #include "main/checkout/ids.hpp"
 
 namespace vclink::git
@@ -13,15 +14,15 @@ namespace vclink::git
 namespace
 {
 
-bool isGitlink(const git_tree_entry *entry)
-{
-    return entry != nullptr && git_tree_entry_filemode(entry) == GIT_FILEMODE_COMMIT;
-}
-
 /// Whether the checkout makes a file or link here.
 bool makesFile(const TreeChange &change)
 {
     return change.after != nullptr && !isGitlink(change.after);
+}
+
+Obstacle stagedChangesOf(const std::string &name)
+{
+    return {name, "the staged changes of '" + name + "' would be lost in the checkout"};
 }
 
 bool isOf(const git_index_entry &entry, const git_tree_entry *side)
@@ -66,14 +67,15 @@ Finding findForeignInFolder(WorkingCopy &copy, const TreeChange &change)
 
 Finding findMissingFolder(WorkingCopy &copy, const TreeChange &change)
 {
-    const bool isMissing = change.before == nullptr && makesFile(change) &&
+    const bool isMissing = change.before == nullptr && change.after != nullptr &&
                            copy.at(change.path) == Standing::Nothing &&
                            copy.isFolderInHead(change.path);
-    return isMissing ? Obstacle{change.path, "the folder '" + change.path +
-                                                 "', which becomes a file, is missing: bring it "
-                                                 "back with 'git restore --source=HEAD --staged "
-                                                 "--worktree' first"}
-                     : Finding();
+    const std::string kind = isGitlink(change.after) ? "submodule" : "file";
+    return isMissing
+               ? Obstacle{change.path, "the folder '" + change.path + "', which becomes a " + kind +
+                                           ", is missing: bring it back with 'git restore "
+                                           "--source=HEAD --staged --worktree' first"}
+               : Finding();
 }
 
 Finding findSubmodule(WorkingCopy &copy, const TreeChange &change)
@@ -81,6 +83,43 @@ Finding findSubmodule(WorkingCopy &copy, const TreeChange &change)
     const bool isReplaced = isGitlink(change.before) && makesFile(change);
     const bool isInTheWay = isReplaced && copy.holdsFiles(change.path);
     return isInTheWay ? inTheWay(change.path, Standing::Folder) : Finding();
+}
+
+Finding findStagedSubmodule(WorkingCopy &copy, const TreeChange &change)
+{
+    const git_index_entry *const entry = copy.entryOf(change.path);
+    const bool isMoved =
+        isGitlink(entry) && !isOf(*entry, change.before) && !isOf(*entry, change.after);
+    const bool isRemoved = entry == nullptr && isGitlink(change.before) && change.after != nullptr;
+    return isMoved || isRemoved ? stagedChangesOf(change.path) : Finding();
+}
+
+Finding findFileForSubmodule(WorkingCopy &copy, const TreeChange &change)
+{
+    if (!isGitlink(change.after) || copy.isInHead(change.path))
+    {
+        return {};
+    }
+    const Standing standing = copy.at(change.path);
+    const bool isInTheWay = standing != Standing::Nothing && standing != Standing::Folder;
+    return isInTheWay ? inTheWay(change.path, standing) : Finding();
+}
+
+Finding findFolderOfOtherUse(WorkingCopy &copy, const TreeChange &change)
+{
+    const bool isReplaced = change.before != nullptr && !isGitlink(change.before);
+    const bool isInTheWay = isReplaced && isGitlink(change.after) && copy.holdsFiles(change.path);
+    return isInTheWay ? inTheWay(change.path, Standing::Folder) : Finding();
+}
+
+Finding findStagedBelowSubmodule(WorkingCopy &copy, const TreeChange &change)
+{
+    if (!isGitlink(change.after) || change.before != nullptr)
+    {
+        return {};
+    }
+    const std::string name = copy.stagedBelow(change.path);
+    return name.empty() ? Finding() : stagedChangesOf(name);
 }
 
 Finding findStagedContent(WorkingCopy &copy, const TreeChange &change)
@@ -96,8 +135,7 @@ Finding findStagedContent(WorkingCopy &copy, const TreeChange &change)
     {
         return {};
     }
-    return Obstacle{change.path,
-                    "the staged changes of '" + change.path + "' would be lost in the checkout"};
+    return stagedChangesOf(change.path);
 }
 
 Finding findBlockedWayOfMerge(WorkingCopy &copy, const TreeChange &change)

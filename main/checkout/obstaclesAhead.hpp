@@ -21,13 +21,27 @@ Finding findIgnoredLink(WorkingCopy &copy, const TreeChange &change);
 /// Something that HEAD does not have in a folder that becomes a file: libgit2 would delete the
 /// folder's tracked files and then fail.
 Finding findForeignInFolder(WorkingCopy &copy, const TreeChange &change);
-/// A missing folder that becomes a file: libgit2 would write neither the file nor its entry.
+/// A missing folder that becomes a file or a submodule: libgit2 would write neither that nor its
+/// entry.
 Finding findMissingFolder(WorkingCopy &copy, const TreeChange &change);
 /// A submodule with files that becomes a file.
 Finding findSubmodule(WorkingCopy &copy, const TreeChange &change);
+/// The staged commit of a submodule that is neither side's, or its staged removal: libgit2 would
+/// drop either.
+Finding findStagedSubmodule(WorkingCopy &copy, const TreeChange &change);
+/// A folder with files in the place of a file that becomes a submodule: libgit2 would delete it.
+Finding findFolderOfOtherUse(WorkingCopy &copy, const TreeChange &change);
+/// Something staged in a folder that becomes a submodule: the index cannot hold both.
+Finding findStagedBelowSubmodule(WorkingCopy &copy, const TreeChange &change);
 /// Staged content that is neither side's and not the file's either: libgit2 compares the file only,
 /// and drops the entry.
 Finding findStagedContent(WorkingCopy &copy, const TreeChange &change);
+
+// Of both.
+
+/// Something other than a folder where a submodule comes, ignored or not: libgit2 would fail in the
+/// midst of its writing, or take a link for the folder.
+Finding findFileForSubmodule(WorkingCopy &copy, const TreeChange &change);
 
 // Before a merge: `before` is of a merge base's tree, `after` of the other side's.
 

@@ -209,27 +209,6 @@ TEST_F(ThreeWayMerge, OfABranchThatAnOctopusHoldsAlreadyDoesNothing)
         EXPECT_NO_THROW(merge(name));
 }
 
-TEST_F(ThreeWayMerge, OfASubmoduleOfOneSideTakesItsCommit)
-{
-    auto inner = addModule();
-    inner.commitAll("inner 2");
-    const std::string second = inner.line({"rev-parse", "HEAD"});
-    const GitRepository module(repository_ / "module");
-    diverge(writing("ours", "x"),
-            [&]
-            {
-                module.git({"fetch", "--quiet"});
-                module.git({"checkout", "--quiet", second});
-            });
-    repository_.git({"submodule", "--quiet", "update"});
-    const auto expected = outcomeByGit("topic");
-    const auto outcome = outcomeByLibrary("topic");
-    EXPECT_EQ(outcome.index, expected.index);
-    EXPECT_EQ(outcome.tree, expected.tree);
-    EXPECT_EQ(outcome.parents, expected.parents);
-    EXPECT_EQ(idOf("HEAD:module"), second);
-}
-
 TEST_F(ThreeWayMerge, OfFileModesThatGitIgnoresIsAsInGit)
 {
     repository_.git({"config", "core.fileMode", "false"});

@@ -57,8 +57,10 @@ class VCLINK_GIT_EXPORT BranchManager
     /// Checks a local branch out and moves HEAD to it. Changes of the user that the branch does not
     /// touch stay. The switch is refused before anything is written if it would lose uncommitted
     /// changes, staged or not, or untracked files, and if a symbolic link, FIFO, socket or device
-    /// is in its way. An ignored file that the branch tracks is overwritten. If a tag has the same
-    /// name, its tree is checked out. Reports progress. After a failure or a cancellation HEAD is
+    /// is in its way. An ignored file that the branch tracks is overwritten. The folder of a
+    /// submodule stays as it is, also where the branch has no such submodule; one that would become
+    /// a file or a folder refuses the switch while it holds files. If a tag has the same name, its
+    /// tree is checked out. Reports progress. After a failure or a cancellation HEAD is
     /// where it was; the files are too, unless one of them, or HEAD itself, couldn't be written.
     /// git_branch_lookup, git_revparse_single, git_checkout_tree, git_repository_set_head.
     /// @param name the short name
@@ -89,7 +91,9 @@ class VCLINK_GIT_EXPORT BranchManager
     /// anything is written if any tracked file has uncommitted changes, even one that the merge
     /// does not touch, and if it would overwrite an untracked file, or a symbolic link, FIFO,
     /// socket or device is in its way; the added text names the first file. The merge drivers may
-    /// have run by then. Missing files come back, ignored ones are overwritten.
+    /// have run by then. Missing files come back, ignored ones are overwritten. Folders of
+    /// submodules stay as they are; the merge commit has the submodules' commits as merged,
+    /// whatever is checked out in them.
     ///
     /// After conflicts the repository is in the state of a merge. Files in conflict have markers
     /// where both sides changed the same lines; a file that a merge command refused may have none,

@@ -206,6 +206,23 @@ TEST_F(RevertObstacles, ThatLibGit2IsPastAreRefused)
     expectRevertsAsGit({"sub/inside", "sub-b", "file", "file-b"});
 }
 
+TEST_F(RevertObstacles, AreFilesInThePlaceOfASubmodule)
+{
+    GitRepository::init(repository_ / "module").commit("first");
+    repository_.commitAll("submodule");
+    repository_.remove("module");
+    repository_.write("module", "mine\n");
+    repository_.write("file", "edited\n");
+    const auto before = workingTreeOf(repository_);
+    const std::string text = "the untracked file 'module' is in the way of the checkout";
+    EXPECT_EQ(failureOf(
+                  [this] {
+                      revert({"file", "module"});
+                  }),
+              (Failure{GIT_ECONFLICT, GIT_ERROR_CHECKOUT, text}));
+    EXPECT_EQ(workingTreeOf(repository_), before);
+}
+
 /// The states are not known then, and are not needed.
 TEST_F(RevertObstacles, HoldsInARevertWhoseStateWalkFails)
 {

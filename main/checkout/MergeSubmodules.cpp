@@ -1,0 +1,73 @@
+// SPDX-License-Identifier: MIT
+#include "main/checkout/MergeSubmodules.hpp"
+
+#include <git2/index.h>
+#include <git2/tree.h>
+
+#include "error/errorUtil/GitResult.hpp"
+#include "main/checkout/gitlinks.hpp"
+
+namespace vclink::git
+{
+namespace
+{
+
+bool isInConflict(git_index *index, const std::string &path)
+{
+    return git_index_get_bypath(index, path.c_str(), GIT_INDEX_STAGE_ANCESTOR) != nullptr ||
+           git_index_get_bypath(index, path.c_str(), GIT_INDEX_STAGE_OURS) != nullptr ||
+           git_index_get_bypath(index, path.c_str(), GIT_INDEX_STAGE_THEIRS) != nullptr;
+}
+
+} // namespace
+
+void MergeSubmodules::noteChange(WorkingCopy &copy, const TreeChange &change)
+{
+    // What ours has removed and they have moved is in conflict.
+    const bool isComing = isGitlink(change.after) && change.before == nullptr &&
+                          copy.entryOf(change.path) == nullptr &&
+                          copy.at(change.path) == Standing::Folder &&
+                          copy.holdsFiles(change.path) && !copy.isInHead(change.path) &&
+                          copy.stagedBelow(change.path).empty();
+    if (isComing)
+    {
+        coming_.push_back({change.path, *git_tree_entry_id(change.after)});
+    }
+}
+
+void MergeSubmodules::stage(git_index *index) const
+{
+    for (const Coming &coming : coming_)
+    {
+        addGitlink(index, coming.path, coming.id);
+    }
+}
+
+void MergeSubmodules::noteUntracked(const WorkingCopy &copy, const std::string &name)
+{
+    // In a merge that libgit2 goes on with nothing is staged but what it will have.
+    if (isGitlink(copy.entryOf(name)))
+    {
+        going_.push_back(name);
+    }
+}
+
+bool MergeSubmodules::isEmpty() const noexcept
+{
+    return going_.empty();
+}
+
+void MergeSubmodules::settle(git_index *index) const
+{
+    for (const std::string &path : going_)
+    {
+        // It is told of twice.
+        const bool isLeft = isGitlink(git_index_get_bypath(index, path.c_str(), 0));
+        if (isLeft && !isInConflict(index, path))
+        {
+            call(git_index_remove, index, path.c_str(), 0).value();
+        }
+    }
+}
+
+} // namespace vclink::git

@@ -1,0 +1,101 @@
+// SPDX-License-Identifier: MIT
+#include "main/checkout/SwitchSubmodules.hpp"
+
+#include <git2/index.h>
+#include <git2/tree.h>
+
+#include "error/errorUtil/GitResult.hpp"
+#include "main/checkout/gitlinks.hpp"
+
+namespace vclink::git
+{
+namespace
+{
+
+/// libgit2 takes the first checkout of a repository, which has no index yet, for one onto nothing.
+bool isFirstCheckout(const WorkingCopy &copy)
+{
+    return standingAt(git_index_path(copy.index())) == Standing::Nothing;
+}
+
+} // namespace
+
+bool SwitchSubmodules::note(WorkingCopy &copy, const TreeChange &change)
+{
+    const bool wasSubmodule = isGitlink(change.before);
+    if (wasSubmodule == isGitlink(change.after))
+    {
+        return false;
+    }
+    const Standing standing = copy.at(change.path);
+    const bool isKept = standing == Standing::Folder && copy.holdsFiles(change.path);
+    if (wasSubmodule && change.after == nullptr)
+    {
+        // libgit2 removes an empty folder, as git does.
+        if (isKept || standing != Standing::Folder)
+        {
+            going_.push_back(change.path);
+        }
+        return isKept;
+    }
+    if (change.before == nullptr)
+    {
+        const bool isComing = isKept && !copy.isFolderInHead(change.path);
+        if (isComing)
+        {
+            coming_.push_back({change.path, *git_tree_entry_id(change.after)});
+        }
+        return isComing;
+    }
+    if (standing == Standing::Nothing)
+    {
+        replaced_.push_back(change.path);
+    }
+    return false;
+}
+
+bool SwitchSubmodules::isEmpty() const noexcept
+{
+    return coming_.empty() && going_.empty() && replaced_.empty();
+}
+
+OwnedHandle<git_index> SwitchSubmodules::makeBaseline(const WorkingCopy &copy) const
+{
+    OwnedHandle<git_index> baseline = acquire<git_index>(git_index_new).value();
+    if (copy.head() != nullptr && !isFirstCheckout(copy))
+    {
+        call(git_index_read_tree, baseline.get(), copy.head()).value();
+        for (const auto *const paths : {&going_, &replaced_})
+        {
+            for (const std::string &path : *paths)
+            {
+                call(git_index_remove, baseline.get(), path.c_str(), 0).value();
+            }
+        }
+    }
+    addComing(baseline.get());
+    return baseline;
+}
+
+void SwitchSubmodules::settle(git_index *index) const
+{
+    for (const std::string &path : going_)
+    {
+        // It is gone already if the user has taken it out of the index, or a folder has come.
+        if (git_index_get_bypath(index, path.c_str(), 0) != nullptr)
+        {
+            call(git_index_remove, index, path.c_str(), 0).value();
+        }
+    }
+    addComing(index);
+}
+
+void SwitchSubmodules::addComing(git_index *index) const
+{
+    for (const Coming &coming : coming_)
+    {
+        addGitlink(index, coming.path, coming.id);
+    }
+}
+
+} // namespace vclink::git

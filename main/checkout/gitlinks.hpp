@@ -1,0 +1,43 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <string>
+
+#include <git2/diff.h>
+#include <git2/index.h>
+#include <git2/tree.h>
+
+#include "error/errorUtil/GitResult.hpp"
+
+/// Entries of submodules, which git calls gitlinks.
+namespace vclink::git
+{
+
+/// Null is none.
+inline bool isGitlink(const git_tree_entry *entry)
+{
+    return entry != nullptr && git_tree_entry_filemode(entry) == GIT_FILEMODE_COMMIT;
+}
+
+inline bool isGitlink(const git_index_entry *entry)
+{
+    return entry != nullptr && entry->mode == GIT_FILEMODE_COMMIT;
+}
+
+inline bool isGitlink(const git_diff_file *file)
+{
+    return file != nullptr && file->mode == GIT_FILEMODE_COMMIT;
+}
+
+/// Adds an entry to an index, in memory, or replaces it. git_index_add.
+/// @throws LibGit2Exception
+inline void addGitlink(git_index *index, const std::string &path, const git_oid &id)
+{
+    git_index_entry entry{};
+    entry.path = path.c_str();
+    entry.mode = GIT_FILEMODE_COMMIT;
+    entry.id = id;
+    call(git_index_add, index, &entry).value();
+}
+
+} // namespace vclink::git

@@ -1,0 +1,259 @@
+// SPDX-License-Identifier: MIT
+#include <functional>
+#include <memory>
+#include <string>
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include "../TestOptionsFactory.hpp"
+#include "ObstacleTest.hpp"
+#include "support/text.hpp"
+
+namespace
+{
+
+namespace git = vclink::git;
+using testing::ElementsAre;
+using testing::IsEmpty;
+using vclink::test::GitRepository;
+using vclink::test::LibGit2Failure;
+using vclink::test::makeFifo;
+
+/// Switches, fast-forwards and merges between branches with and without the submodule "module".
+class SubmoduleObstacles : public vclink::test::ObstacleTest
+{
+  protected:
+    /// "with" has the submodule, main does not, and its folder is left.
+    void makeLeft()
+    {
+        repository_.git({"checkout", "--quiet", "-b", "with"});
+        addModule();
+        repository_.write("a first", "x");
+        repository_.commitAll("changed");
+        repository_.git({"checkout", "--quiet", "main"});
+        ASSERT_THAT(status(), ElementsAre("?? module/"));
+    }
+    /// The same, without the folder.
+    void makeAdding()
+    {
+        makeLeft();
+        repository_.remove("module");
+    }
+    /// main has the submodule, and "topic" something else in its place.
+    void makeReplacing(const std::function<void()> &replace)
+    {
+        addModule();
+        repository_.git({"checkout", "--quiet", "-b", "topic"});
+        repository_.git({"rm", "--quiet", "--force", "module"});
+        repository_.write("a first", "x");
+        replace();
+        repository_.commitAll("on topic");
+        repository_.git({"checkout", "--quiet", "main"});
+    }
+    void populate() const
+    {
+        repository_.git({"submodule", "--quiet", "update", "--init"});
+    }
+    void switchTo(const std::string &name) const
+    {
+        branches().switchBranch(name);
+        EXPECT_EQ(currentBranch(), "refs/heads/" + name);
+    }
+    void expectRefused(const LibGit2Failure &failure, const std::string &branch) const
+    {
+        expectSwitchRefused(failure, branch);
+        expectNothingChanges([&] { EXPECT_EQ(failureOfMerge(branch), textOf(failure)); });
+    }
+    static LibGit2Failure staged(const std::string &name)
+    {
+        return refusal("the staged changes of '" + name + "' would be lost in the checkout");
+    }
+
+    const GitRepository module_{repository_ / "module"};
+};
+
+TEST_F(SubmoduleObstacles, AreNotFoldersOfSubmodulesThatGoAndComeBack)
+{
+    makeLeft();
+    switchTo("with");
+    EXPECT_THAT(status(), IsEmpty());
+    module_.write("untracked", "mine\n");
+    GitRepository(module_).commitAll("mine");
+    const std::string mine = module_.line({"rev-parse", "HEAD"});
+    switchTo("main");
+    EXPECT_THAT(status(), ElementsAre("?? module/"));
+    EXPECT_EQ(module_.line({"rev-parse", "HEAD"}), mine);
+    switchTo("with");
+    EXPECT_THAT(status(), ElementsAre(" M module"));
+    EXPECT_EQ(module_.read("untracked"), "mine\n");
+}
+
+TEST_F(SubmoduleObstacles, AreNotFoldersWhereAFastForwardBringsASubmodule)
+{
+    makeLeft();
+    merge("with");
+    EXPECT_EQ(idOf("main"), idOf("with"));
+    EXPECT_THAT(status(), IsEmpty());
+}
+
+TEST_F(SubmoduleObstacles, AreNotIgnoredFoldersWhereASubmoduleComes)
+{
+    makeAdding();
+    repository_.write(".git/info/exclude", "/module\n");
+    repository_.write("module/precious", "mine\n");
+    switchTo("with");
+    EXPECT_EQ(repository_.read("module/precious"), "mine\n");
+    EXPECT_EQ(idOf("with:module"), repository_.line({"rev-parse", ":module"}));
+}
+
+TEST_F(SubmoduleObstacles, AreNotFilesInThePlaceOfASubmoduleThatGoes)
+{
+    makeLeft();
+    switchTo("with");
+    repository_.remove("module");
+    repository_.write("module", "mine\n");
+    switchTo("main");
+    EXPECT_EQ(repository_.read("module"), "mine\n");
+    EXPECT_THAT(status(), ElementsAre("?? module"));
+}
+
+TEST_F(SubmoduleObstacles, AreFilesAndLinksWhereASubmoduleComes)
+{
+    makeAdding();
+    repository_.write(".git/info/exclude", "/module\n");
+    repository_.write("module", "mine\n");
+    expectRefused(inTheWay("untracked file 'module'"), "with");
+    repository_.remove("module");
+    repository_.symlink("d", "module");
+    expectRefused(inTheWay("symbolic link 'module'"), "with");
+    repository_.remove("module");
+    makeFifo(repository_ / "module");
+    expectRefused(inTheWay("FIFO, socket or device 'module'"), "with");
+    repository_.remove("module");
+    repository_.write("ours", "x");
+    repository_.commitAll("on main");
+    repository_.write("module", "mine\n");
+    expectNothingChanges(
+        [this] { EXPECT_EQ(failureOfMerge("with"), textOf(inTheWay("untracked file 'module'"))); });
+}
+
+TEST_F(SubmoduleObstacles, AreFoldersInThePlaceOfAFileThatBecomesASubmodule)
+{
+    makeBranch("topic",
+               [this]
+               {
+                   repository_.write("a first", "x");
+                   repository_.remove("other");
+                   auto inner = GitRepository::init(repository_ / "other");
+                   inner.commitAll("inner");
+               });
+    repository_.git({"checkout", "--quiet", "--force", "main"});
+    repository_.remove("other");
+    repository_.write("other/precious", "mine\n");
+    expectRefused(inTheWay("folder 'other'"), "topic");
+    repository_.remove("other");
+    // A file that is only missing is in nobody's way.
+    switchTo("topic");
+    EXPECT_THAT(status(), IsEmpty());
+}
+
+TEST_F(SubmoduleObstacles, AreMissingFoldersThatBecomeASubmodule)
+{
+    makeBranch("topic",
+               [this]
+               {
+                   repository_.git({"rm", "-r", "--quiet", "d"});
+                   auto inner = GitRepository::init(repository_ / "d");
+                   inner.commitAll("inner");
+               });
+    ASSERT_EQ(repository_.line({"cat-file", "-t", "main:d"}), "tree");
+    ASSERT_NE(repository_.line({"ls-tree", "topic", "d"}).find("commit"), std::string::npos);
+    repository_.remove("d");
+    expectRefused(refusal("the folder 'd', which becomes a submodule, is missing: bring it back "
+                          "with 'git restore --source=HEAD --staged --worktree' first"),
+                  "topic");
+}
+
+TEST_F(SubmoduleObstacles, AreStagedFilesInAFolderThatBecomesASubmodule)
+{
+    makeAdding();
+    repository_.write("module/staged", "mine\n");
+    repository_.add({"module/staged"});
+    expectRefused(staged("module/staged"), "with");
+}
+
+TEST_F(SubmoduleObstacles, AreNotMissingSubmodulesThatBecomeAFile)
+{
+    makeReplacing([this] { repository_.write("module", "theirs\n"); });
+    repository_.remove("module");
+    switchTo("topic");
+    EXPECT_EQ(repository_.read("module"), "theirs\n");
+    EXPECT_THAT(status(), IsEmpty());
+}
+
+TEST_F(SubmoduleObstacles, AreNotMissingSubmodulesThatBecomeAFolder)
+{
+    makeReplacing([this] { repository_.write("module/a", "theirs\n"); });
+    repository_.remove("module");
+    switchTo("topic");
+    EXPECT_EQ(repository_.read("module/a"), "theirs\n");
+    EXPECT_THAT(status(), IsEmpty());
+}
+
+TEST_F(SubmoduleObstacles, AreSubmodulesWithFilesThatBecomeAFolder)
+{
+    makeReplacing([this] { repository_.write("module/a", "theirs\n"); });
+    populate();
+    expectRefused(inTheWay("folder 'module'"), "topic");
+}
+
+TEST_F(SubmoduleObstacles, AreStagedCommitsOfASubmodule)
+{
+    addModule();
+    repository_.git({"checkout", "--quiet", "-b", "topic"});
+    GitRepository(module_).commitAll("theirs");
+    repository_.commitAll("on topic");
+    repository_.git({"checkout", "--quiet", "main"});
+    GitRepository module(module_);
+    module.commitAll("more");
+    repository_.add({"module"});
+    expectRefused(staged("module"), "topic");
+    repository_.git({"rm", "--quiet", "--cached", "module"});
+    expectRefused(staged("module"), "topic");
+}
+
+/// A host's options factory may ask for force: libgit2 would delete the folders then.
+TEST_F(SubmoduleObstacles, OfAForcedSwitchAreFoldersOfSubmodules)
+{
+    makeLeft();
+    const auto factory = std::make_shared<vclink::test::TestOptionsFactory>(interactor_);
+    factory->checkoutOptions.checkoutStrategy = GIT_CHECKOUT_FORCE;
+    git::GitAdapter adapter(vclink::test::asPath(repository_.path()), factory);
+    const auto expectForcedRefused = [&](const std::string &branch)
+    {
+        expectNothingChanges(
+            [&]
+            {
+                EXPECT_EQ(vclink::test::libGit2FailureOf(
+                              [&] { git::BranchManager::create(adapter)->switchBranch(branch); }),
+                          inTheWay("folder 'module'"));
+            });
+    };
+    expectForcedRefused("with");
+    switchTo("with");
+    expectForcedRefused("main");
+}
+
+/// Its git_checkout_tree has no index to compare with.
+TEST_F(SubmoduleObstacles, AreNotFoldersWhereASubmoduleComesWithoutAnIndex)
+{
+    makeLeft();
+    for (const auto *name : {"file", "other", "d"})
+        repository_.remove(name);
+    repository_.remove(".git/index");
+    switchTo("with");
+    EXPECT_THAT(status(), IsEmpty());
+}
+
+} // namespace
