@@ -53,7 +53,8 @@ class GitAdapter : public vclink::CMAdapter
     std::shared_ptr<GitOptionsFactory> getOptionsFactory() const;
     GitCallbacks &getCallbacks() const;
     std::shared_ptr<ApplicationInteractor> getInteractor() const;
-    /// Lets commit() refuse to make any other commit than the one that concludes this merge.
+    /// Lets commit() refuse to make any other commit than the one that concludes this merge, and
+    /// take submodules as the index has them, whatever is checked out in them.
     /// @param sides outlive the commit; null for no merge
     void expectMerge(const MergeSides *sides) noexcept;
 
@@ -63,6 +64,8 @@ class GitAdapter : public vclink::CMAdapter
     void removeFromIndex(const std::vector<upath> &files);
     void createCommit(git_repository *repository, const ustring &message,
                       const std::vector<const git_commit *> &parents, IndexLock &lock);
+    void refreshForCommit(git_repository *repository, git_index *index,
+                          const std::vector<const git_commit *> &parents) const;
     /// @return the states that it looked at
     FileStateMap throwIfConflicted(const std::vector<upath> &files);
 

@@ -13,6 +13,7 @@
 #include "error/errorUtil/GitResult.hpp"
 #include "error/errorUtil/callbackException.hpp"
 #include "fl/i18n/convert.hpp"
+#include "main/CommitSubmodules.hpp"
 #include "main/GitAdapter.hpp"
 #include "main/MergeMarker.hpp"
 #include "main/commitIdentity.hpp"
@@ -113,13 +114,29 @@ void GitAdapter::expectMerge(const MergeSides *sides) noexcept
     expectedMerge_ = sides;
 }
 
+void GitAdapter::refreshForCommit(git_repository *repository, git_index *index,
+                                  const std::vector<const git_commit *> &parents) const
+{
+    const CommitSubmodules submodules(index);
+    submodules.resolve(index);
+    if (expectedMerge_ != nullptr)
+    {
+        submodules.takeOut(index);
+    }
+    refreshIndex(repository, index);
+    if (expectedMerge_ != nullptr || parents.size() > 1)
+    {
+        submodules.restore(index, expectedMerge_ != nullptr ? nullptr : parents.front());
+    }
+}
+
 void GitAdapter::createCommit(git_repository *repository, const ustring &message,
                               const std::vector<const git_commit *> &parents, IndexLock &lock)
 {
     // First, so that a missing identity fails with nothing touched.
     const OwnedHandle<git_signature> signature = makeSignature(repository);
     const OwnedHandle<git_index> index = getRepositoryIndex(repository);
-    refreshIndex(repository, index.get());
+    refreshForCommit(repository, index.get(), parents);
     writeIndex(index.get());
     // To libgit2 it ends at its first NUL.
     const std::string text = fl::i18n::ustring_to_utf8(message);

@@ -1,22 +1,16 @@
 // SPDX-License-Identifier: MIT
 #include <functional>
-#include <memory>
 #include <string>
-#include <utility>
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include "MergeTest.hpp"
-#include "main/GitAdapter.hpp"
-#include "support/TestInteractor.hpp"
 #include "support/text.hpp"
-#include "vclink/git/BranchManager.hpp"
 
 namespace
 {
 
-namespace git = vclink::git;
 using testing::ElementsAre;
 using testing::IsEmpty;
 using vclink::test::GitRepository;
@@ -260,36 +254,6 @@ TEST_F(MergedSubmodules, ThatWeRemovedAndTheyMovedAreInConflictBesideAnIgnoredFo
     repository_.write(".git/info/exclude", "/module\n");
     expectAsGitBesideTheFolder();
     EXPECT_THAT(conflicts(), ElementsAre("1 module", "3 module"));
-}
-
-/// An adapter before whose commit another process concludes the merge.
-class LateAdapter : public git::GitAdapter
-{
-  public:
-    LateAdapter(const GitRepository &repository, std::shared_ptr<vclink::test::TestInteractor> host)
-        : GitAdapter(vclink::test::asPath(repository.path().string()),
-                     std::static_pointer_cast<vclink::ApplicationInteractor>(std::move(host))),
-          repository_(repository)
-    {
-    }
-    void commit(const upath &folder, const ustring &message) override
-    {
-        repository_.git({"commit", "--quiet", "--no-edit"});
-        GitAdapter::commit(folder, message);
-    }
-
-  private:
-    const GitRepository &repository_;
-};
-
-TEST_F(MergedSubmodules, StayIfAnotherProcessConcludesTheMerge)
-{
-    theyMove(writing("ours", "x"));
-    LateAdapter adapter(repository_, interactor_);
-    git::BranchManager::create(adapter)->merge("topic");
-    EXPECT_THAT(parents(), testing::SizeIs(1));
-    EXPECT_EQ(idOf("HEAD:module"), second_);
-    EXPECT_EQ(idOf("HEAD~1:module"), second_);
 }
 
 /// All that they did; a later commit must not take the merge for one that was interrupted.

@@ -1,0 +1,109 @@
+// SPDX-License-Identifier: MIT
+#include "main/CommitSubmodules.hpp"
+
+#include <cstddef>
+#include <memory>
+
+#include <git2/commit.h>
+#include <git2/errors.h>
+#include <git2/tree.h>
+
+#include "error/errorUtil/GitResult.hpp"
+#include "main/checkout/gitlinks.hpp"
+#include "main/checkout/ids.hpp"
+
+namespace vclink::git
+{
+namespace
+{
+
+/// Whether the commit has the submodule at this id.
+bool hasGitlink(const git_tree *tree, const std::string &path, const git_oid &id)
+{
+    git_tree_entry *raw = nullptr;
+    const GitResult<void> found = call(git_tree_entry_bypath, &raw, tree, path.c_str());
+    const std::unique_ptr<git_tree_entry, void (*)(git_tree_entry *)> entry(raw,
+                                                                            git_tree_entry_free);
+    if (found.has_error() && found.error().getCode() == GIT_ENOTFOUND)
+    {
+        return false;
+    }
+    found.value();
+    return isGitlink(entry.get()) && isSameId(*git_tree_entry_id(entry.get()), id);
+}
+
+bool isAtHead(const git_commit *head, const std::string &path, const git_oid &id)
+{
+    const OwnedHandle<git_tree> tree = acquire<git_tree>(git_commit_tree, head).value();
+    return hasGitlink(tree.get(), path, id);
+}
+
+} // namespace
+
+CommitSubmodules::CommitSubmodules(git_index *index)
+{
+    const std::size_t count = git_index_entrycount(index);
+    for (std::size_t i = 0; i < count; ++i)
+    {
+        const git_index_entry *const entry = git_index_get_byindex(index, i);
+        if (!isGitlink(entry))
+        {
+            continue;
+        }
+        const int stage = GIT_INDEX_ENTRY_STAGE(entry);
+        if (stage == GIT_INDEX_STAGE_NORMAL)
+        {
+            submodules_.push_back({entry->path, *entry});
+        }
+        else if (stage == GIT_INDEX_STAGE_OURS)
+        {
+            conflicts_.push_back({entry->path, *entry});
+        }
+    }
+}
+
+void CommitSubmodules::resolve(git_index *index) const
+{
+    for (const Submodule &submodule : conflicts_)
+    {
+        const char *const path = submodule.path.c_str();
+        for (const int stage :
+             {GIT_INDEX_STAGE_ANCESTOR, GIT_INDEX_STAGE_OURS, GIT_INDEX_STAGE_THEIRS})
+        {
+            if (git_index_get_bypath(index, path, stage) != nullptr)
+            {
+                call(git_index_remove, index, path, stage).value();
+            }
+        }
+        addGitlink(index, submodule.path, submodule.entry.id);
+    }
+}
+
+void CommitSubmodules::takeOut(git_index *index) const
+{
+    for (const Submodule &submodule : submodules_)
+    {
+        call(git_index_remove, index, submodule.path.c_str(), 0).value();
+    }
+}
+
+void CommitSubmodules::restore(git_index *index, const git_commit *head) const
+{
+    for (const Submodule &submodule : submodules_)
+    {
+        const char *const path = submodule.path.c_str();
+        const git_index_entry *const now = git_index_get_bypath(index, path, 0);
+        if (isGitlink(now) && isSameId(now->id, submodule.entry.id))
+        {
+            continue;
+        }
+        if (head == nullptr || (isGitlink(now) && isAtHead(head, submodule.path, now->id)))
+        {
+            git_index_entry entry = submodule.entry;
+            entry.path = path;
+            call(git_index_add, index, &entry).value();
+        }
+    }
+}
+
+} // namespace vclink::git
