@@ -135,6 +135,7 @@ std::vector<Operation> adapterOperations()
         {"commitNothing", makeUnindexed, commit},
         {"commitUnreadable", makeUnreadable, commit},
         {"commitMerge", makeMerging, commit},
+        {"commitMergeOfSubmodule", makeMergingSubmodule, commit},
     };
 }
 

@@ -161,6 +161,7 @@ std::vector<Tolerance> tolerancesOfOthers(const std::string &operation, const st
         {"mergeThreeWay", "git_diff_tree_to_tree", any, any, normal, true},
         {"mergeBesideHidden", "git_diff_tree_to_tree", any, any, normal, true},
         {"mergeOverIgnored", "git_diff_tree_to_tree", any, any, normal, true},
+        {"mergeSubmodules", "git_diff_tree_to_tree", any, any, normal, true},
         {"merge", "git_index_has_conflicts", any, any, hasConflicts},
         // The first look-up chooses the words of the message, the second is the commit's, after
         // those of the look before the merge.

@@ -32,6 +32,15 @@ void divergeInFile(GitRepository &repository)
     repository.commitAll("on main");
 }
 
+/// Stages a repository of its own.
+void addSubmodule(const GitRepository &repository, const std::string &path)
+{
+    auto submodule = GitRepository::init(repository / path);
+    submodule.write("inner", path);
+    submodule.commitAll("inner");
+    repository.add({path});
+}
+
 void makeConflictUnder(GitRepository &repository, const std::string &attributes)
 {
     repository.write(".gitattributes", attributes);
@@ -149,6 +158,45 @@ void makeIgnored(GitRepository &repository)
     makeDiverged(repository);
     repository.write(".git/info/exclude", "added\n");
     repository.write("added/ignored", "x");
+}
+
+void makeSubmodules(GitRepository &repository)
+{
+    makePlain(repository);
+    addSubmodule(repository, "gone");
+    repository.commit("submodule");
+    repository.git({"checkout", "--quiet", "-b", "topic"});
+    repository.git({"rm", "--quiet", "--cached", "gone"});
+    repository.write("file", "theirs\n");
+    repository.add({"file"});
+    addSubmodule(repository, "come");
+    repository.commit("on topic");
+    repository.git({"checkout", "--quiet", "main"});
+}
+
+void makeDivergedSubmodules(GitRepository &repository)
+{
+    makeSubmodules(repository);
+    repository.write("other", "ours\n");
+    repository.add({"other"});
+    repository.commit("on main");
+}
+
+void makeMergingSubmodule(GitRepository &repository)
+{
+    makePlain(repository);
+    addSubmodule(repository, "moved");
+    repository.commit("submodule");
+    GitRepository submodule(repository / "moved");
+    const std::string before = submodule.line({"rev-parse", "HEAD"});
+    repository.git({"checkout", "--quiet", "-b", "topic"});
+    submodule.commitAll("moved");
+    repository.commitAll("on topic");
+    repository.git({"checkout", "--quiet", "main"});
+    submodule.git({"checkout", "--quiet", before});
+    repository.write("other", "ours\n");
+    repository.commitAll("on main");
+    repository.git({"merge", "--quiet", "--no-commit", "topic"});
 }
 
 void makeMerging(GitRepository &repository)

@@ -38,6 +38,13 @@ void makeDiverged(GitRepository &repository);
 void makeHidden(GitRepository &repository);
 /// Diverged, and an ignored folder where "topic" adds a file.
 void makeIgnored(GitRepository &repository);
+/// "topic" has the submodule "come" and lacks "gone", which main has, and changes "file". The
+/// folders of both are there.
+void makeSubmodules(GitRepository &repository);
+/// The same, with another change on main.
+void makeDivergedSubmodules(GitRepository &repository);
+/// Stopped in a merge that has moved the submodule "moved".
+void makeMergingSubmodule(GitRepository &repository);
 /// Diverged, and stopped in a merge without conflicts.
 void makeMerging(GitRepository &repository);
 /// Main and topic change the same line of "file", for which there is no tool.
