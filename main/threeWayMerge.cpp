@@ -133,7 +133,7 @@ void BranchMerger::threeWayMerge(const BranchName &name, git_repository *reposit
     watch.lookBeforeMerge(git_annotated_commit_id(theirs));
     const MergeSides sides{readHeadId(repository), *git_annotated_commit_id(theirs)};
     marker.emplace(repository, sides);
-    call(git_merge, repository, heads, 1, &mergeRecord, &checkoutRecord).value();
+    call(git_merge, repository, heads, 1U, &mergeRecord, &checkoutRecord).value();
     restoreMergeHead(repository, sides.theirs);
     watch.settleSubmodules();
     const OwnedHandle<git_index> index = getRepositoryIndex(repository);

@@ -22,10 +22,10 @@ class LateCommit
     explicit LateCommit(GitRepository repository) : repository_(std::move(repository))
     {
         // 30 s at most.
-        repository_.write(hook, "#!/bin/sh\n: >\"$0.reached\"\nturn=0\n"
-                                "while [ ! -e \"$0.go\" ] && [ $turn -lt 3000 ]; do\n"
-                                "    sleep 0.01; turn=$((turn + 1))\ndone\n");
-        repository_.setMode(hook, 0755);
+        repository_.write(hook_, "#!/bin/sh\n: >\"$0.reached\"\nturn=0\n"
+                                 "while [ ! -e \"$0.go\" ] && [ $turn -lt 3000 ]; do\n"
+                                 "    sleep 0.01; turn=$((turn + 1))\ndone\n");
+        repository_.setMode(hook_, 0755);
         thread_ = std::thread(
             [this]
             {
@@ -50,7 +50,7 @@ class LateCommit
     /// @return whether git has committed
     bool goOn()
     {
-        repository_.write(hook + ".go", "");
+        repository_.write(hook_ + ".go", "");
         thread_.join();
         return isDone_;
     }
@@ -58,10 +58,10 @@ class LateCommit
   private:
     bool exists(const std::string &suffix) const
     {
-        return std::filesystem::exists(repository_ / (hook + suffix));
+        return std::filesystem::exists(repository_ / (hook_ + suffix));
     }
 
-    const std::string hook = ".git/hooks/commit-msg";
+    const std::string hook_ = ".git/hooks/commit-msg";
     GitRepository repository_;
     bool isDone_ = false;
     std::thread thread_;
