@@ -72,7 +72,7 @@ void CommitSubmodules::resolve(git_index *index) const
         {
             if (git_index_get_bypath(index, path, stage) != nullptr)
             {
-                call(git_index_remove, index, path, stage).value();
+                check(git_index_remove, index, path, stage);
             }
         }
         addGitlink(index, submodule.path, submodule.entry.id);
@@ -83,7 +83,7 @@ void CommitSubmodules::takeOut(git_index *index) const
 {
     for (const Submodule &submodule : submodules_)
     {
-        call(git_index_remove, index, submodule.path.c_str(), 0).value();
+        check(git_index_remove, index, submodule.path.c_str(), 0);
     }
 }
 
@@ -101,7 +101,7 @@ void CommitSubmodules::restore(git_index *index, const git_commit *head) const
         {
             git_index_entry entry = submodule.entry;
             entry.path = path;
-            call(git_index_add, index, &entry).value();
+            check(git_index_add, index, &entry);
         }
     }
 }

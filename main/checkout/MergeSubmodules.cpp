@@ -65,7 +65,7 @@ void MergeSubmodules::settle(git_index *index) const
         const bool isLeft = isGitlink(git_index_get_bypath(index, path.c_str(), 0));
         if (isLeft && !isInConflict(index, path))
         {
-            call(git_index_remove, index, path.c_str(), 0).value();
+            check(git_index_remove, index, path.c_str(), 0);
         }
     }
 }

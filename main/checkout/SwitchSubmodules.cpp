@@ -64,12 +64,12 @@ OwnedHandle<git_index> SwitchSubmodules::makeBaseline(const WorkingCopy &copy) c
     OwnedHandle<git_index> baseline = acquire<git_index>(git_index_new).value();
     if (copy.head() != nullptr && !isFirstCheckout(copy))
     {
-        call(git_index_read_tree, baseline.get(), copy.head()).value();
+        check(git_index_read_tree, baseline.get(), copy.head());
         for (const auto *const paths : {&going_, &replaced_})
         {
             for (const std::string &path : *paths)
             {
-                call(git_index_remove, baseline.get(), path.c_str(), 0).value();
+                check(git_index_remove, baseline.get(), path.c_str(), 0);
             }
         }
     }
@@ -84,7 +84,7 @@ void SwitchSubmodules::settle(git_index *index) const
         // It is gone already if the user has taken it out of the index, or a folder has come.
         if (git_index_get_bypath(index, path.c_str(), 0) != nullptr)
         {
-            call(git_index_remove, index, path.c_str(), 0).value();
+            check(git_index_remove, index, path.c_str(), 0);
         }
     }
     addComing(index);

@@ -37,7 +37,7 @@ inline void addGitlink(git_index *index, const std::string &path, const git_oid 
     entry.path = path.c_str();
     entry.mode = GIT_FILEMODE_COMMIT;
     entry.id = id;
-    call(git_index_add, index, &entry).value();
+    check(git_index_add, index, &entry);
 }
 
 } // namespace vclink::git
