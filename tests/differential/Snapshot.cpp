@@ -64,6 +64,9 @@ void readFiles(const fs::path &copy, const fs::path &folder, Snapshot &snapshot)
             entry.disable_recursion_pending();
             continue;
         }
+        // It holds times, which no two working copies share.
+        if (entry->path().filename() == "index" && entry->path().parent_path().filename() == ".git")
+            continue;
         readEntry(entry->path(), entry->path().lexically_relative(folder).string(), snapshot);
     }
 }

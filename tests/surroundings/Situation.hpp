@@ -16,7 +16,8 @@ enum class Holds
 {
     nothing,
     file,
-    folder
+    folder,
+    submodule
 };
 
 /// Where an obstacle stands, and what the other branch does there.
@@ -28,6 +29,8 @@ struct Place
     std::string path;
     /// a branch of the working copy that makeSurroundings() makes
     std::string branch;
+    /// Clears the place, where even what it holds is in the way.
+    std::function<void(const GitRepository &copy)> giveWay = [](const GitRepository &) {};
 };
 
 /// Something in a working copy that is not as it was committed.
@@ -49,6 +52,15 @@ const std::vector<Obstacle> &allObstacles();
 /// the one commit of main and also changes the first and the last file; "ours" follows it with a
 /// change of a file that no other branch touches.
 void makeSurroundings(const std::filesystem::path &folder);
+
+/// The same of submodules, and two more.
+const std::vector<Place> &submodulePlaces();
+const std::vector<Obstacle> &submoduleObstacles();
+
+/// Makes "copy", a working copy on "main" with submodules, and "source", where these come from.
+/// Each of its branches changes the first and the last file as well, but those that begin with
+/// "ours".
+void makeSubmoduleSurroundings(const std::filesystem::path &folder);
 
 /// Copies what makeSurroundings() has made.
 void copySurroundings(const std::filesystem::path &from, const std::filesystem::path &to);

@@ -2,9 +2,8 @@
 #include "Situation.hpp"
 
 #include <map>
-#include <stdexcept>
 
-#include "differential/quoting.hpp"
+#include "imports.hpp"
 
 namespace vclink::test
 {
@@ -12,9 +11,6 @@ namespace
 {
 
 namespace fs = std::filesystem;
-
-/// Paths with contents; "-" takes one away.
-using Files = std::map<std::string, std::string>;
 
 const Files committed{{"a first", "first\n"}, {"d/file", "deep\n"},     {"file", "of main\n"},
                       {"mine", "mine\n"},     {"other", "untouched\n"}, {"t/file", "of main\n"},
@@ -36,22 +32,6 @@ const std::map<std::string, Files> branches{
     {"files",
      {{"new", "theirs\n"}, {"t/file", "-"}, {"t/keep", "-"}, {"t/s/file", "-"}, {"t", "theirs\n"}}},
     {"ours", {{"mine", "of ours\n"}}}};
-
-std::string commitOf(const std::string &branch, const Files &files)
-{
-    std::string stream = "commit refs/heads/" + branch +
-                         "\ncommitter A <a@example.com> 1577836800 +0000\n" +
-                         asFastImportData(branch);
-    if (branch != "main")
-        stream += "from refs/heads/main\n";
-    for (const auto &[path, content] : files)
-        if (content == "-")
-            stream += "D \"" + path + "\"\n";
-    for (const auto &[path, content] : files)
-        if (content != "-")
-            stream += "M 100644 inline \"" + path + "\"\n" + asFastImportData(content);
-    return stream;
-}
 
 void copyFiles(const fs::path &from, const fs::path &to)
 {
@@ -95,7 +75,6 @@ const std::vector<Place> &allPlaces()
 void makeSurroundings(const fs::path &folder)
 {
     const auto copy = GitRepository::init(folder / "copy");
-    copy.git({"config", "core.logAllRefUpdates", "false"});
     copy.write("../outside/file", "outside\n");
     copy.write("../outside/keep", "outside\n");
     copy.write("../outside/new", "outside\n");
@@ -108,14 +87,7 @@ void makeSurroundings(const fs::path &folder)
             files = branches.at(branch);
         stream += commitOf(branch, files);
     }
-    const auto import =
-        copy.command({"-c", "fastimport.unpackLimit=1", "fast-import", "--quiet"}).input(stream);
-    const auto result = import.run();
-    if (!result.succeeded())
-        throw std::runtime_error(import.text() + ": " + result.errors);
-    copy.git({"pack-refs", "--all"});
-    copy.git({"reset", "--quiet", "--hard"});
-    copy.write(".git/info/exclude", "");
+    importCommits(copy, stream);
 }
 
 void copySurroundings(const fs::path &from, const fs::path &to)
@@ -134,6 +106,12 @@ void clearSurroundings(const fs::path &original, const fs::path &folder)
             copyFiles(entry.path(), folder / "copy" / entry.path().filename());
     fs::copy_file(original / "copy/.git/index", folder / "copy/.git/index",
                   fs::copy_options::overwrite_existing);
+    const fs::path repositories = "copy/.git/modules";
+    if (fs::exists(original / repositories))
+    {
+        fs::remove_all(folder / repositories);
+        copyFiles(original / repositories, folder / repositories);
+    }
 }
 
 } // namespace vclink::test

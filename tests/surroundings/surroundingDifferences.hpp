@@ -13,9 +13,9 @@ struct Comparand
     std::string operation;
     std::string obstacle;
     std::string place;
-    /// "goes through" or "refuses"
+    /// "goes through", "stops in conflicts" or "refuses"
     std::string git;
-    /// "goes through", "refuses", or "leaves something else" where git goes through as well
+    /// the same, or "leaves something else" where git does neither refuse
     std::string library;
 };
 

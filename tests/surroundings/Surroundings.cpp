@@ -1,0 +1,214 @@
+// SPDX-License-Identifier: MIT
+#include "Surroundings.hpp"
+
+#include <algorithm>
+#include <cstdlib>
+#include <exception>
+#include <fstream>
+#include <iostream>
+#include <utility>
+
+#include <gtest/gtest.h>
+
+#include "support/ChildProcess.hpp"
+#include "support/TestInteractor.hpp"
+#include "support/text.hpp"
+#include "vclink/git/GitAdapterFactory.hpp"
+
+namespace vclink::test
+{
+namespace
+{
+
+namespace fs = std::filesystem;
+
+constexpr std::chrono::seconds patience{5};
+
+const std::string goesThrough = "goes through";
+const std::string refuses = "refuses";
+
+Snapshot look(const fs::path &folder)
+{
+    return takeSnapshot(folder / "copy", folder);
+}
+
+std::string describe(bool isDone, const Snapshot &after)
+{
+    if (isDone)
+        return goesThrough;
+    return after.underWay.count("MERGE_HEAD") == 1 ? "stops in conflicts" : refuses;
+}
+
+} // namespace
+
+Surroundings::Surroundings(void (*make)(const fs::path &folder))
+{
+    std::ofstream(environment().home() / ".gitconfig")
+        << "[user]\n\tname = Somebody\n\temail = somebody@example.com\n";
+    make(original_);
+}
+
+void Surroundings::go(const std::string &branch)
+{
+    GitRepository(original_ / "copy").git({"switch", "--quiet", branch});
+    committed_ = committedContents(original_ / "copy");
+}
+
+void Surroundings::check(const Cell &cell)
+{
+    const std::string name = cell.situation.operation + ": " + cell.obstacle.name + ", " +
+                             cell.place.name + " (" + cell.place.path + ')';
+    const char *const wanted = std::getenv("VCLINK_CELL");
+    if (wanted != nullptr && name.find(wanted) == std::string::npos)
+        return;
+    ++cells_;
+    SCOPED_TRACE(name);
+    try
+    {
+        compare(cell);
+    }
+    catch (const std::exception &exception)
+    {
+        ADD_FAILURE() << exception.what();
+    }
+    for (const auto *side : {"library", "git"})
+        fs::remove_all(folder() / side);
+}
+
+void Surroundings::conclude(const std::string &operation) const
+{
+    std::cout << cells_ << " situations of " << operation << '\n';
+    for (const auto &[outcome, count] : outcomes_)
+        std::cout << "  " << count << " x " << outcome << '\n';
+    if (std::getenv("VCLINK_CELL") != nullptr)
+        return;
+    for (const auto &difference : surroundingDifferences())
+    {
+        const auto &names = difference.operations;
+        const bool isMeant = std::count(names.begin(), names.end(), operation) == 1;
+        EXPECT_EQ(met_.count(&difference), isMeant ? 1U : 0U)
+            << difference.reason << " in " << difference.place;
+    }
+}
+
+std::string Surroundings::outcomeOf(const Obstacle &obstacle, const std::function<void()> &action)
+{
+    const auto textOf = [&action]() -> std::string
+    {
+        try
+        {
+            action();
+            return {};
+        }
+        catch (const std::exception &exception)
+        {
+            return std::string("raised ") + exception.what();
+        }
+    };
+    return obstacle.mayBlock ? runInChild(textOf, patience) : textOf();
+}
+
+std::unique_ptr<CMAdapter> Surroundings::makeAdapter(const fs::path &copy)
+{
+    return git::GitAdapterFactory().createAdapterFor(asPath(copy.string()),
+                                                     std::make_shared<TestInteractor>());
+}
+
+fs::path Surroundings::makeTwin(const Cell &cell, const std::string &side, bool isObstructed)
+{
+    const fs::path path = folder() / side;
+    copySurroundings(original_, path);
+    const GitRepository copy(path / "copy");
+    if (isObstructed)
+        cell.obstacle.put(copy, cell.place.path);
+    else
+        cell.place.giveWay(copy);
+    cell.prepare(copy);
+    return path;
+}
+
+void Surroundings::compare(const Cell &cell)
+{
+    const fs::path library = makeTwin(cell, "library");
+    const fs::path git = makeTwin(cell, "git");
+    const Snapshot before = look(library);
+
+    const std::string raised = cell.byLibrary(library / "copy");
+    const auto byGit = GitRepository(git / "copy").command(cell.byGit).timeout(patience).run();
+    EXPECT_FALSE(byGit.timedOut);
+
+    const Snapshot after = look(library);
+    const Snapshot afterGit = look(git);
+    const std::string difference = differenceOf(afterGit, after);
+    Comparand comparand = cell.situation;
+    comparand.git = describe(byGit.succeeded(), afterGit);
+    comparand.library = describe(raised.empty(), after);
+    const bool isRefused = comparand.library == refuses;
+    if (comparand.git == comparand.library && !isRefused && !difference.empty())
+        comparand.library = "leaves something else";
+    ++outcomes_["git " + comparand.git + ", the library " + comparand.library];
+
+    for (const auto &id : lostFrom(before, after, library))
+        EXPECT_TRUE(comparand.git != refuses && lostFrom(before, afterGit, git).count(id) == 1)
+            << id << " is lost";
+    EXPECT_TRUE(comparand.git == comparand.library || isExplained(comparand))
+        << "git " << comparand.git << ", the library " << comparand.library << '\n'
+        << byGit.errors << raised << '\n'
+        << (comparand.library == "leaves something else" ? difference : "");
+    if (isRefused)
+    {
+        EXPECT_EQ(changeOf(before, after), "") << "refused with " << raised;
+        expectWorksWithoutObstacle(cell, library);
+    }
+}
+
+std::set<std::string> Surroundings::lostFrom(const Snapshot &before, const Snapshot &after,
+                                             const fs::path &folder) const
+{
+    std::set<std::string> contents = before.indexIds;
+    for (const auto &[name, id] : before.fileIds)
+        contents.insert(id);
+    for (const auto &id : committed_)
+        contents.erase(id);
+    return lostOf(std::move(contents), after, folder / "copy");
+}
+
+void Surroundings::expectWorksWithoutObstacle(const Cell &cell, const fs::path &library)
+{
+    clearSurroundings(original_, library);
+    cell.place.giveWay(GitRepository(library / "copy"));
+    cell.prepare(GitRepository(library / "copy"));
+    const std::string raised = cell.byLibrary(library / "copy");
+    const Snapshot after = look(library);
+    EXPECT_NE(describe(raised.empty(), after), refuses)
+        << raised << " though nothing is in the way any more";
+    std::string key = cell.place.path;
+    for (const auto &argument : cell.byGit)
+        key += ' ' + argument;
+    if (references_.count(key) == 0)
+    {
+        const fs::path reference = makeTwin(cell, "reference", false);
+        GitRepository(reference / "copy").tryGit(cell.byGit);
+        references_[key] = look(reference);
+        fs::remove_all(reference);
+    }
+    if (raised.empty())
+    {
+        EXPECT_EQ(differenceOf(references_[key], after), "");
+    }
+}
+
+bool Surroundings::isExplained(const Comparand &comparand)
+{
+    bool isMet = false;
+    for (const auto &difference : surroundingDifferences())
+    {
+        if (!difference.explains(comparand))
+            continue;
+        met_.insert(&difference);
+        isMet = true;
+    }
+    return isMet;
+}
+
+} // namespace vclink::test

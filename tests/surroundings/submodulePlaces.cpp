@@ -1,0 +1,124 @@
+// SPDX-License-Identifier: MIT
+#include "Situation.hpp"
+
+#include <map>
+
+#include "imports.hpp"
+
+namespace vclink::test
+{
+namespace
+{
+
+namespace fs = std::filesystem;
+
+const std::string twoModules = "[submodule \"s\"]\n\tpath = s\n\turl = ../source\n"
+                               "[submodule \"t/s\"]\n\tpath = t/s\n\turl = ../source\n";
+const std::string moreModules =
+    twoModules + "[submodule \"new\"]\n\tpath = new\n\turl = ../source\n";
+const std::string renamedModules = "[submodule \"s\"]\n\tpath = r\n\turl = ../source\n"
+                                   "[submodule \"t/s\"]\n\tpath = t/r\n\turl = ../source\n";
+
+/// The submodules' commits, by the names of the branches of "source".
+using Commits = std::map<std::string, std::string>;
+
+Files filesOfMain(const Commits &at)
+{
+    return {{"a first", "first\n"}, {"d/file", "deep\n"},        {"d/other", "deep too\n"},
+            {"file", "of main\n"},  {"mine", "mine\n"},          {"t/keep", "kept\n"},
+            {"zz last", "last\n"},  {".gitmodules", twoModules}, {"s", at.at("first")},
+            {"t/s", at.at("first")}};
+}
+
+std::map<std::string, Files> filesOfBranches(const Commits &at)
+{
+    const std::string gone = "-";
+    const std::string &first = at.at("first");
+    const std::string &second = at.at("second");
+    const std::string &third = at.at("third");
+    return {
+        {"adds",
+         {{".gitmodules", moreModules}, {"new", first}, {"t/new", first}, {"u/new", first}}},
+        {"moves", {{"s", second}, {"t/s", second}}},
+        {"removes", {{".gitmodules", gone}, {"s", gone}, {"t/s", gone}}},
+        {"renames",
+         {{".gitmodules", renamedModules},
+          {"s", gone},
+          {"t/s", gone},
+          {"r", first},
+          {"t/r", first}}},
+        {"files", {{"s", "theirs\n"}}},
+        {"folders", {{"s", gone}, {"s/inner", "theirs\n"}}},
+        {"unrelated", {{"t/different", "theirs\n"}}},
+        {"takes", {{"file", first}, {"d/file", gone}, {"d/other", gone}, {"d", first}}},
+        {"ours", {{"mine", "of ours\n"}}},
+        {"ours-moves", {{"mine", "of ours\n"}, {"s", third}, {"t/s", third}}},
+        {"ours-removes",
+         {{"mine", "of ours\n"}, {".gitmodules", gone}, {"s", gone}, {"t/s", gone}}},
+    };
+}
+
+/// @return its commits: each follows the one before
+Commits makeSource(const fs::path &folder)
+{
+    auto source = GitRepository::init(folder);
+    Commits commits;
+    for (const std::string name : {"first", "second", "third"})
+    {
+        source.write("inner", name + '\n');
+        commits[name] = source.commitAll(name);
+    }
+    return commits;
+}
+
+void emptyIt(const GitRepository &copy)
+{
+    copy.remove("s");
+    copy.makeFolder("s");
+}
+
+} // namespace
+
+const std::vector<Place> &submodulePlaces()
+{
+    constexpr bool common = true;
+    constexpr bool rare = false;
+    constexpr auto submodule = Holds::submodule;
+    static const std::vector<Place> places{
+        {"a moved submodule", submodule, common, "s", "moves"},
+        {"a removed submodule", submodule, common, "s", "removes"},
+        {"a removed submodule below a folder", submodule, rare, "t/s", "removes"},
+        {"a renamed submodule", submodule, common, "s", "renames"},
+        {"a submodule that becomes a file", submodule, common, "s", "files", emptyIt},
+        {"a submodule that becomes a folder", submodule, common, "s", "folders", emptyIt},
+        {"a submodule left alone", submodule, common, "s", "unrelated"},
+        {"a new submodule", Holds::nothing, common, "new", "adds"},
+        {"a new submodule below a tracked folder", Holds::nothing, rare, "t/new", "adds"},
+        {"a new submodule below an untracked folder", Holds::nothing, rare, "u/new", "adds"},
+        {"a file that becomes a submodule", Holds::file, common, "file", "takes"},
+        {"in a folder that becomes a submodule", Holds::file, rare, "d/file", "takes"},
+        {"new in a folder that becomes a submodule", Holds::nothing, common, "d/new", "takes"},
+        {"a folder that becomes a submodule", Holds::folder, common, "d", "takes"},
+    };
+    return places;
+}
+
+void makeSubmoduleSurroundings(const fs::path &folder)
+{
+    const Commits commits = makeSource(folder / "source");
+    const auto copy = GitRepository::init(folder / "copy");
+    std::string stream = commitOf("main", filesOfMain(commits));
+    for (auto [branch, files] : filesOfBranches(commits))
+    {
+        if (branch.compare(0, 4, "ours") != 0)
+        {
+            files["a first"] = "first of " + branch + '\n';
+            files["zz last"] = "last of " + branch + '\n';
+        }
+        stream += commitOf(branch, files);
+    }
+    importCommits(copy, stream);
+    copy.git({"submodule", "--quiet", "update", "--init"});
+}
+
+} // namespace vclink::test
