@@ -102,11 +102,14 @@ std::vector<Tolerance> tolerancesOfCommits(const std::string &operation, const s
         {"commit", "git_commit_lookup", 1, any, isOtherTip},
         // A state that is none of a merge's is not looked at.
         {"commit", "git_repository_state", any, any, normal},
-        // There is no commit then, for all one knows, and no text. A fast-forward makes none, and
-        // looks for the one that it goes to.
+        // There is no commit then, for all one knows, and the text is what making it has left: none,
+        // or that of a look for the branch. A fast-forward makes none, and looks for the one that it
+        // goes to.
         {"mergeFastForward", "git_object_lookup", any, GIT_ENOTFOUND,
          failureIn(operation, GIT_ENOTFOUND, GIT_ERROR_OS, injectedText)},
         {"merge", "git_object_lookup", any, GIT_ENOTFOUND, failureIn(operation, GIT_ERROR, 0, "")},
+        {"commitFirst", "git_object_lookup", any, GIT_ENOTFOUND,
+         failure(GIT_ERROR, GIT_ERROR_REFERENCE, "reference 'refs/heads/main' not found")},
         {"commit", "git_object_lookup", any, GIT_ENOTFOUND, failure(GIT_ERROR, 0, "")},
         // The identity comes from the environment then.
         {"", "git_signature_default", any, GIT_ENOTFOUND, normal},
