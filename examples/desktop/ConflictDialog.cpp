@@ -125,7 +125,7 @@ void ConflictDialog::follow()
     conclude_->setEnabled(isIdle && files_.empty() && snapshot->repositoryState == "Conflicts");
     resolved_->setEnabled(isIdle && !files_.empty());
     toolButton_->setEnabled(isIdle && hasSides() && !tool_.isOpen());
-    if (selected() != shown_)
+    if (isIdle && selected() != shown_)
         readSelected();
 }
 
@@ -154,7 +154,6 @@ void ConflictDialog::readSelected()
         if (dialog != nullptr)
             dialog->showSides(file, *sides);
     };
-    // While something else runs, the next snapshot asks again.
     context_.runner.run(std::move(operation));
 }
 

@@ -27,10 +27,16 @@ void Runner::setRoot(const upath &root)
     refresh();
 }
 
-bool Runner::run(Operation operation)
+void Runner::run(Operation operation)
 {
-    if (operation_ != nullptr)
-        return false;
+    if (operation_ == nullptr)
+        begin(std::move(operation));
+    else
+        waiting_.push_back(std::move(operation));
+}
+
+void Runner::begin(Operation operation)
+{
     operation_ = std::make_shared<Operation>(std::move(operation));
     isAttached_ = isAsked_ = false;
     interactor_ = std::make_shared<host_tools::Interactor>(
@@ -39,7 +45,6 @@ bool Runner::run(Operation operation)
     worker_.post([this, root = root_, operation = operation_, interactor = interactor_]
                  { execute(root, *operation, interactor); });
     listener_.changed();
-    return true;
 }
 
 void Runner::execute(const upath &root, const Operation &operation,
@@ -86,26 +91,35 @@ void Runner::showProgress(double fraction, const ustring &message)
     listener_.changed();
 }
 
-void Runner::finish(std::exception_ptr failure)
+void Runner::finish(const std::exception_ptr &failure)
 {
     const auto operation = std::exchange(operation_, nullptr);
-    interactor_.reset();
+    const bool isAsked = isAsked_;
     refresh();
-    listener_.changed();
     if (failure == nullptr)
     {
-        if (isAsked_)
+        if (isAsked)
             listener_.told(say("Too late to cancel: it was done already."));
         if (operation->done)
             operation->done();
-        return;
     }
-    auto described = host_tools::describe(failure);
-    // A merge has no exception of its own for it: only the host knows that it has asked.
-    if (isAsked_ && described.kind == host_tools::FailureKind::MergeFailed)
-        described.kind = host_tools::FailureKind::Cancelled;
-    if (!operation->failed || !operation->failed(described))
-        listener_.failed(*operation, described);
+    else
+    {
+        auto described = host_tools::describe(failure);
+        // A merge has no exception of its own for it: only the host knows that it has asked.
+        if (isAsked && described.kind == host_tools::FailureKind::MergeFailed)
+            described.kind = host_tools::FailureKind::Cancelled;
+        if (!operation->failed || !operation->failed(described))
+            listener_.failed(*operation, described);
+    }
+    if (operation_ == nullptr && !waiting_.empty())
+    {
+        Operation next = std::move(waiting_.front());
+        waiting_.pop_front();
+        begin(std::move(next));
+    }
+    // Last, as a window that waits for the end closes now.
+    listener_.changed();
 }
 
 void Runner::refresh()

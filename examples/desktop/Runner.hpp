@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include <deque>
 #include <exception>
 #include <functional>
 #include <memory>
@@ -62,8 +63,8 @@ class Runner : public QObject
     {
         return root_;
     }
-    /// @return whether it was started: nothing is while another one runs
-    bool run(Operation operation);
+    /// Begins as soon as nothing else runs.
+    void run(Operation operation);
     /// The operation that runs, or null.
     const Operation *current() const noexcept
     {
@@ -72,7 +73,7 @@ class Runner : public QObject
     /// Whether nothing runs, and the states have been read since.
     bool isSettled() const noexcept
     {
-        return operation_ == nullptr && !isReading_ && !readsAgain_;
+        return operation_ == nullptr && waiting_.empty() && !isReading_ && !readsAgain_;
     }
     /// Whether cancel() would reach the operation.
     bool canCancel() const;
@@ -83,9 +84,10 @@ class Runner : public QObject
   private:
     void execute(const upath &root, const Operation &operation,
                  const std::shared_ptr<host_tools::Interactor> &interactor);
+    void begin(Operation operation);
     void attached();
     void showProgress(double fraction, const ustring &message);
-    void finish(std::exception_ptr failure);
+    void finish(const std::exception_ptr &failure);
     void readAgain();
     /// Runs on the thread of the window.
     void post(std::function<void()> function);
@@ -94,6 +96,7 @@ class Runner : public QObject
     RunnerListener listener_;
     upath root_;
     std::shared_ptr<Operation> operation_;
+    std::deque<Operation> waiting_;
     std::shared_ptr<host_tools::Interactor> interactor_;
     bool isAttached_ = false;
     bool isAsked_ = false;

@@ -203,7 +203,7 @@ void Window::failed(const Operation &operation, const host_tools::Failure &failu
 {
     if (failure.kind == host_tools::FailureKind::Cancelled)
     {
-        statusBar()->showMessage(say("Cancelled. Nothing has been written."));
+        statusBar()->showMessage(say("Cancelled. No file has been written."));
         return;
     }
     // The person has to see it.

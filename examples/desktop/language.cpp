@@ -63,7 +63,7 @@ constexpr Words words[] = {
     {"Too late to cancel: it was done already.",
      "Zum Abbrechen war es zu spät: Es war schon erledigt.",
      "キャンセルできませんでした。すでに完了しています。"},
-    {"Cancelled. Nothing has been written.", "Abgebrochen. Es wurde nichts geschrieben.",
+    {"Cancelled. No file has been written.", "Abgebrochen. Es wurde keine Datei geschrieben.",
      "キャンセルしました。ファイルは書き込まれていません。"},
     {"Closing as soon as this has ended: %1", "Schließt, sobald dies beendet ist: %1",
      "次の処理が終わると閉じます: %1"},

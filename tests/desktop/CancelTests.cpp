@@ -84,7 +84,7 @@ TEST_F(Cancel, EndsASwitchBeforeItWritesAnything)
     EXPECT_FALSE(button().isEnabled());
     unlock("HEAD");
     settle();
-    EXPECT_EQ(told(), "Cancelled. Nothing has been written.");
+    EXPECT_EQ(told(), "Cancelled. No file has been written.");
     EXPECT_EQ(head(), "main");
     EXPECT_EQ(repository_.read("a"), "first\n");
 }
@@ -99,7 +99,7 @@ TEST_F(Cancel, EndsAMergeAsACancellation)
     button().click();
     unlock("refs/heads/main");
     settle();
-    EXPECT_EQ(told(), "Cancelled. Nothing has been written.");
+    EXPECT_EQ(told(), "Cancelled. No file has been written.");
     EXPECT_EQ(repository_.read("a"), "first\n");
 }
 
@@ -142,7 +142,7 @@ TEST_F(Cancel, IsNotOfferedWhileFilesAreWritten)
     vclink::desktop::Operation operation;
     operation.kind = vclink::desktop::Operation::Kind::Checkout;
     operation.run = [](vclink::desktop::Work &work) { work.branches()->switchBranch("many"); };
-    ASSERT_TRUE(runner.run(operation));
+    runner.run(operation);
     ASSERT_TRUE(waitFor([&runner] { return runner.isSettled(); }));
     EXPECT_EQ(head(), "many");
     ASSERT_FALSE(seen.empty());
@@ -185,6 +185,21 @@ TEST_F(Cancel, LeavesTheWindowResponsiveDuringALongSwitch)
     // A window that waits for the library has no more than a few.
     EXPECT_GE(ticks, milliseconds / 50);
     EXPECT_GE(ticks, 4);
+}
+
+TEST_F(Cancel, ClosingShowsWhatFailedAndStays)
+{
+    repository_.git({"config", "core.filesRefLockTimeout", "500"});
+    repository_.write("a", "second\n");
+    open();
+    lock("refs/heads/main");
+    choose("commit");
+    fill({"Second"});
+    ASSERT_TRUE(waitFor([this] { return window().runner().current() != nullptr; }));
+    window().close();
+    EXPECT_THAT(takeMessage(), HasSubstr("lock"));
+    settle();
+    EXPECT_TRUE(window().isVisible());
 }
 
 TEST_F(Cancel, IsAskedByClosingTheWindowWhichThenWaits)
