@@ -55,12 +55,12 @@ inline ustring relativeName(const upath &path, const upath &root)
     return path.string().substr(start);
 }
 
-/// The order of FileStateMap, for std::sort and the like.
+/// The order of FileStateMap, for std::sort and the like: std::less is there, and operator< is not.
 struct PathOrder
 {
     bool operator()(const upath &left, const upath &right) const noexcept
     {
-        return std::less<upath>()(left, right);
+        return fl::filesystem::detail::less(left.string(), right.string());
     }
 };
 

@@ -2,6 +2,7 @@
 #include "StatesView.hpp"
 
 #include <unordered_set>
+#include <utility>
 
 #include <QHBoxLayout>
 #include <QHeaderView>
@@ -46,7 +47,8 @@ StatesView::StatesView(std::function<void()> selected, QWidget *parent)
     connect(name_, &QLineEdit::textChanged, &filter_, &StatesFilter::setFilterFixedString);
     connect(shown_, &QComboBox::currentIndexChanged, this,
             [this](int index) { filter_.setShowsClean(index == 1); });
-    connect(list_->selectionModel(), &QItemSelectionModel::selectionChanged, this, selected);
+    connect(list_->selectionModel(), &QItemSelectionModel::selectionChanged, this,
+            std::move(selected));
     retranslate();
 }
 

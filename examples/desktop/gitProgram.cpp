@@ -77,6 +77,7 @@ std::optional<std::string> runGit(const upath &root, std::vector<std::string> ar
     const std::string folder = host_tools::toStdPath(root).string();
     arguments.insert(arguments.begin(), {"git", "-C", folder});
     std::vector<char *> pointers;
+    pointers.reserve(arguments.size() + 1);
     for (auto &argument : arguments)
         pointers.push_back(argument.data());
     pointers.push_back(nullptr);

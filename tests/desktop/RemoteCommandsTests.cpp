@@ -27,12 +27,12 @@ class RunningDaemon
   protected:
     RunningDaemon()
     {
-        if (server_ == nullptr)
-            server_ = std::make_unique<GitDaemon>();
+        if (daemon == nullptr)
+            daemon = std::make_unique<GitDaemon>();
     }
-    static std::unique_ptr<GitDaemon> server_;
+    static std::unique_ptr<GitDaemon> daemon;
 };
-std::unique_ptr<GitDaemon> RunningDaemon::server_;
+std::unique_ptr<GitDaemon> RunningDaemon::daemon;
 
 class RemoteCommands : private RunningDaemon, public DesktopTest
 {
@@ -46,7 +46,7 @@ class RemoteCommands : private RunningDaemon, public DesktopTest
     }
     static void TearDownTestSuite()
     {
-        server_.reset();
+        daemon.reset();
     }
     std::string servedId() const
     {
@@ -58,8 +58,8 @@ class RemoteCommands : private RunningDaemon, public DesktopTest
         fill(values);
     }
 
-    GitRepository served_ = server_->makeRepository();
-    std::string url_ = server_->url(served_);
+    GitRepository served_ = daemon->makeRepository();
+    std::string url_ = daemon->url(served_);
 };
 
 TEST_F(RemoteCommands, FetchBringsTheBranches)
