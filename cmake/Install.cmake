@@ -11,16 +11,19 @@ install(DIRECTORY include/
 vclink_install_package_files(vclink_git "${PROJECT_SOURCE_DIR}/cmake/package"
     COMPONENT development)
 
-# Laid as they are here, so that their links lead to each other, and to the smallest host.
+# Laid as they are here, so that their links lead to each other, and to the examples.
 install(FILES README.md
     DESTINATION share/doc/libvclink-git-dev
     COMPONENT development)
 install(DIRECTORY docs
     DESTINATION share/doc/libvclink-git-dev
     COMPONENT development
-    FILES_MATCHING PATTERN "*.md")
-install(FILES examples/embed/CMakeLists.txt examples/embed/main.cpp
-    DESTINATION share/doc/libvclink-git-dev/examples/embed
+    FILES_MATCHING PATTERN "*.md" PATTERN "*.png")
+install(DIRECTORY examples/desktop examples/embed examples/integrating
+    DESTINATION share/doc/libvclink-git-dev/examples
+    COMPONENT development)
+install(FILES examples/hostTools.hpp
+    DESTINATION share/doc/libvclink-git-dev/examples
     COMPONENT development)
 
 if(VCLINK_BUILD_EXAMPLES)

@@ -82,14 +82,21 @@ TEST_F(Component, DevelopmentIsTheExportedHeadersWhatFindsTheLibraryAndTheDocume
         expected.push_back(name);
     }
     const std::string documents = "share/doc/libvclink-git-dev/";
-    for (const auto *name :
-         {"copyright", "README.md", "examples/embed/CMakeLists.txt", "examples/embed/main.cpp"})
+    for (const auto *name : {"copyright", "README.md", "examples/hostTools.hpp"})
     {
         expected.push_back(documents + name);
     }
+    for (const std::string example : {"desktop", "embed", "integrating"})
+    {
+        for (const auto &name : filesBelow(VCLINK_SOURCE_FOLDER "/examples/" + example))
+        {
+            expected.push_back(documents + "examples/" + example + "/" + name);
+        }
+    }
     for (const auto &name : filesBelow(VCLINK_SOURCE_FOLDER "/docs"))
     {
-        if (std::filesystem::path(name).extension() == ".md")
+        const auto extension = std::filesystem::path(name).extension();
+        if (extension == ".md" || extension == ".png")
         {
             expected.push_back(documents + "docs/" + name);
         }
