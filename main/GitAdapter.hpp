@@ -62,9 +62,10 @@ class GitAdapter : public vclink::CMAdapter
     FileStateMap collectFileStates(char **pathspecStrings, std::size_t pathspecCount);
     void addToIndex(const std::vector<upath> &files);
     void removeFromIndex(const std::vector<upath> &files);
-    void createCommit(git_repository *repository, const ustring &message,
+    /// @param head one of the parents; null if HEAD gives no commit
+    void createCommit(git_repository *repository, const ustring &message, const git_commit *head,
                       const std::vector<const git_commit *> &parents, IndexLock &lock);
-    void refreshForCommit(git_repository *repository, git_index *index,
+    void refreshForCommit(git_repository *repository, git_index *index, const git_commit *head,
                           const std::vector<const git_commit *> &parents) const;
     /// @return the states that it looked at
     FileStateMap throwIfConflicted(const std::vector<upath> &files);

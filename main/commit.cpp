@@ -80,9 +80,10 @@ void GitAdapter::commit(const upath & /*folder*/, const ustring &message)
     const GitResult<OwnedHandle<git_commit>> head = lookupCommitByName("HEAD", repository.get());
     std::vector<OwnedHandle<git_commit>> mergeHeads;
     std::vector<const git_commit *> parents;
-    if (head.has_value())
+    const git_commit *const headCommit = head.has_value() ? head.value().get() : nullptr;
+    if (headCommit != nullptr)
     {
-        parents.push_back(head.value().get());
+        parents.push_back(headCommit);
     }
     const int state = readRepositoryState(repository.get());
     if (state == GIT_REPOSITORY_STATE_MERGE)
@@ -97,7 +98,7 @@ void GitAdapter::commit(const upath & /*folder*/, const ustring &message)
     {
         refuseOtherParents(*expectedMerge_, parents);
     }
-    if (head.has_value() && mergeHeads.size() == 1)
+    if (headCommit != nullptr && mergeHeads.size() == 1)
     {
         refuseInterruptedMerge(repository.get(), parents.front(), parents.back());
     }
@@ -105,7 +106,7 @@ void GitAdapter::commit(const upath & /*folder*/, const ustring &message)
     {
         removeMergeMarker(repository.get());
     }
-    createCommit(repository.get(), message, parents, lock);
+    createCommit(repository.get(), message, headCommit, parents, lock);
     expectMerge(nullptr);
 }
 
@@ -115,6 +116,7 @@ void GitAdapter::expectMerge(const MergeSides *sides) noexcept
 }
 
 void GitAdapter::refreshForCommit(git_repository *repository, git_index *index,
+                                  const git_commit *head,
                                   const std::vector<const git_commit *> &parents) const
 {
     const CommitSubmodules submodules(index);
@@ -124,19 +126,22 @@ void GitAdapter::refreshForCommit(git_repository *repository, git_index *index,
         submodules.takeOut(index);
     }
     refreshIndex(repository, index);
-    if (expectedMerge_ != nullptr || parents.size() > 1)
+    // Where HEAD can't be read, nothing tells which commit the user has checked out on purpose.
+    const std::size_t ours = head != nullptr ? 1 : 0;
+    if (expectedMerge_ != nullptr || parents.size() > ours)
     {
-        submodules.restore(index, expectedMerge_ != nullptr ? nullptr : parents.front());
+        submodules.restore(index, expectedMerge_ != nullptr ? nullptr : head);
     }
 }
 
 void GitAdapter::createCommit(git_repository *repository, const ustring &message,
+                              const git_commit *head,
                               const std::vector<const git_commit *> &parents, IndexLock &lock)
 {
     // First, so that a missing identity fails with nothing touched.
     const OwnedHandle<git_signature> signature = makeSignature(repository);
     const OwnedHandle<git_index> index = getRepositoryIndex(repository);
-    refreshForCommit(repository, index.get(), parents);
+    refreshForCommit(repository, index.get(), head, parents);
     writeIndex(index.get());
     // To libgit2 it ends at its first NUL.
     const std::string text = fl::i18n::ustring_to_utf8(message);

@@ -19,8 +19,8 @@ namespace
 namespace fs = std::filesystem;
 using vclink::test::ChangeSequence;
 
-constexpr std::uint64_t sequenceBlocks = 10;
-constexpr std::uint64_t sequencesInBlock = 10;
+constexpr std::uint64_t sequenceBlocks = 4;
+constexpr std::uint64_t sequencesInBlock = 25;
 
 std::uint64_t numberFrom(const char *variable, std::uint64_t otherwise)
 {

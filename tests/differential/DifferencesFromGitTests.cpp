@@ -150,31 +150,6 @@ TEST_F(DifferencesFromGit, AFileThatTookTheirFoldersPlaceIsInTheWayOfARevert)
     EXPECT_EQ(statusOf(repository), "");
 }
 
-// libgit2 adds the file to the index, which takes the folder's files out of it, and fails to take
-// them out once more, though only where the file is the index's first. Nothing is changed then.
-TEST_F(DifferencesFromGit, AStagedFolderThatTookAFilesPlaceIsInTheWayOfARevert)
-{
-    auto repository = makeRepository();
-    repository.write("a", "x");
-    repository.commitAll("first");
-    repository.remove("a");
-    repository.write("a/inner", "x");
-    repository.add();
-    const std::string before = statusOf(repository);
-    try
-    {
-        makeAdapter(repository)->revertFiles({asPath(repository / "a")});
-        ADD_FAILURE() << "nothing was raised";
-    }
-    catch (const LibGit2Exception &exception)
-    {
-        EXPECT_EQ(asUtf8(exception.getError().getMessage()), "index does not contain a/inner");
-    }
-    EXPECT_EQ(statusOf(repository), before);
-    repository.git({"reset", "--quiet", "--", "a"});
-    EXPECT_EQ(statusOf(repository), " D a\n?? a/inner\n");
-}
-
 // git takes the folder's files out of the index. libgit2 does that for what the list's pattern
 // matches, and a name that has to be escaped is a pattern for itself alone. A commit mends it.
 TEST_F(DifferencesFromGit, AFileWithAnEscapedNameIsStagedBesideTheFolderThatItReplaces)
