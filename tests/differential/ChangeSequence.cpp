@@ -332,8 +332,8 @@ bool ChangeSequence::hasIndexedBelow(const std::string &path)
                        { return isBelow(entry.first, path) && entry.second.indexMode != noMode; });
 }
 
-/// Leaves out files that a file stands in the way of, and files whose place a staged folder took:
-/// with these libgit2 fails. See DifferencesFromGit.
+/// Leaves out files that a file stands in the way of: with these libgit2 fails. See
+/// DifferencesFromGit.
 bool ChangeSequence::canBeReverted(const Names &names)
 {
     const auto &tree = twins_.workingTree();
@@ -342,10 +342,8 @@ bool ChangeSequence::canBeReverted(const Names &names)
     return std::none_of(report.begin(), report.end(),
                         [&](const auto &entry)
                         {
-                            const auto &[path, file] = entry;
-                            const bool replaced = file.headMode != noMode && hasIndexedBelow(path);
-                            return isMeant(path, resolved) &&
-                                   (replaced || isBelowFile(tree, folderOf(path)));
+                            const std::string &path = entry.first;
+                            return isMeant(path, resolved) && isBelowFile(tree, folderOf(path));
                         });
 }
 
