@@ -11,8 +11,8 @@ namespace vclink::git
 {
 
 /// A new file in the system's temporary folder with these bytes, for the caller to remove. A file
-/// that can't be written, or not whole, goes unnoticed: the name comes back all the same. No link is
-/// followed that somebody has put in its place.
+/// that can't be written, or not whole, goes unnoticed: the name comes back all the same. No link
+/// is followed that somebody has put in its place.
 /// @throws std::bad_alloc: no file is left then
 upath writeTemporaryFile(const void *data, std::size_t size);
 

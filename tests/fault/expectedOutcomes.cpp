@@ -102,8 +102,10 @@ std::vector<Tolerance> tolerancesOfCommits(const std::string &operation, const s
         {"commit", "git_commit_lookup", 1, any, isOtherTip},
         // A state that is none of a merge's is not looked at.
         {"commit", "git_repository_state", any, any, normal},
-        // There is no commit then, for all one knows, and the text is what making it has left: none,
-        // or that of a look for the branch. A fast-forward makes none, and looks for the one that it
+        // There is no commit then, for all one knows, and the text is what making it has left:
+        // none,
+        // or that of a look for the branch. A fast-forward makes none, and looks for the one that
+        // it
         // goes to.
         {"mergeFastForward", "git_object_lookup", any, GIT_ENOTFOUND,
          failureIn(operation, GIT_ENOTFOUND, GIT_ERROR_OS, injectedText)},

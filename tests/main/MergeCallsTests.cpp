@@ -101,7 +101,8 @@ TEST_F(CallsOfAMerge, OfAFastForwardAreTheseInOrder)
                        "git_checkout_options_init"},
                       lookBeforeASwitch_,
                       {"git_transaction_new", "git_transaction_lock_ref", "git_transaction_free",
-                       "git_repository_head", "git_reference_free", "git_checkout_tree", "git_reference_set_target", "git_reference_free"},
+                       "git_repository_head", "git_reference_free", "git_checkout_tree",
+                       "git_reference_set_target", "git_reference_free"},
                       endOfTheLook_,
                       {"git_object_free", "git_reference_free", "git_annotated_commit_free",
                        "git_repository_free"}}));
@@ -190,8 +191,8 @@ TEST_F(CallsOfAMerge, OfACleanMergeAreTheseInOrder)
                  "git_index_free", "git_repository_state"},
                 lookBeforeAMerge_,
                 {"git_reference_name_to_id", "git_oid_fmt", "git_oid_fmt", "git_merge",
-                 "git_oid_fmt", "git_repository_index", "git_index_has_conflicts", "git_reference_dwim",
-                 "git_reference_free", "git_repository_open_ext"}});
+                 "git_oid_fmt", "git_repository_index", "git_index_has_conflicts",
+                 "git_reference_dwim", "git_reference_free", "git_repository_open_ext"}});
     ASSERT_GE(calls.steps().size(), expected.size());
     const auto size = static_cast<std::ptrdiff_t>(expected.size());
     const Calls first(calls.steps().begin(), calls.steps().begin() + size);
