@@ -1,7 +1,9 @@
 // SPDX-License-Identifier: MIT
 #include "main/CommitSubmodules.hpp"
 
+#include <algorithm>
 #include <cstddef>
+#include <iterator>
 #include <memory>
 
 #include <git2/commit.h>
@@ -17,31 +19,46 @@ namespace vclink::git
 namespace
 {
 
-/// Whether the commit has the submodule at this id.
-bool hasGitlink(const git_tree *tree, const std::string &path, const git_oid &id)
+using Trees = std::vector<OwnedHandle<git_tree>>;
+
+using TreeEntry = std::unique_ptr<git_tree_entry, void (*)(git_tree_entry *)>;
+
+/// Null if the tree has nothing there.
+TreeEntry findEntry(const git_tree *tree, const std::string &path)
 {
     git_tree_entry *raw = nullptr;
     const GitResult<void> found = call(git_tree_entry_bypath, &raw, tree, path.c_str());
-    const std::unique_ptr<git_tree_entry, void (*)(git_tree_entry *)> entry(raw,
-                                                                            git_tree_entry_free);
-    if (found.has_error() && found.error().getCode() == GIT_ENOTFOUND)
+    TreeEntry entry(raw, git_tree_entry_free);
+    if (!found.has_error() || found.error().getCode() != GIT_ENOTFOUND)
     {
-        return false;
+        found.value();
     }
-    found.value();
-    return isGitlink(entry.get()) && isSameId(*git_tree_entry_id(entry.get()), id);
+    return entry;
+}
+
+OwnedHandle<git_tree> treeOf(const git_commit *commit)
+{
+    return acquire<git_tree>(git_commit_tree, commit).value();
 }
 
 bool isAtHead(const git_commit *head, const std::string &path, const git_oid &id)
 {
-    const OwnedHandle<git_tree> tree = acquire<git_tree>(git_commit_tree, head).value();
-    return hasGitlink(tree.get(), path, id);
+    const TreeEntry entry = findEntry(treeOf(head).get(), path);
+    return isGitlink(entry.get()) && isSameId(*git_tree_entry_id(entry.get()), id);
+}
+
+bool isSubmoduleIn(const Trees &trees, const std::string &path)
+{
+    return std::any_of(trees.begin(), trees.end(),
+                       [&path](const auto &tree)
+                       { return isGitlink(findEntry(tree.get(), path).get()); });
 }
 
 } // namespace
 
-CommitSubmodules::CommitSubmodules(git_index *index)
+CommitSubmodules::CommitSubmodules(git_index *index, const std::vector<const git_commit *> &parents)
 {
+    Trees trees;
     const std::size_t count = git_index_entrycount(index);
     for (std::size_t i = 0; i < count; ++i)
     {
@@ -50,8 +67,12 @@ CommitSubmodules::CommitSubmodules(git_index *index)
         {
             continue;
         }
+        if (trees.empty())
+        {
+            std::transform(parents.begin(), parents.end(), std::back_inserter(trees), treeOf);
+        }
         const int stage = GIT_INDEX_ENTRY_STAGE(entry);
-        if (stage == GIT_INDEX_STAGE_NORMAL)
+        if (stage == GIT_INDEX_STAGE_NORMAL && isSubmoduleIn(trees, entry->path))
         {
             submodules_.push_back({entry->path, *entry});
         }

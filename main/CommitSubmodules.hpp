@@ -18,8 +18,11 @@ namespace vclink::git
 class CommitSubmodules
 {
   public:
-    /// Notes the submodules that the index has.
-    explicit CommitSubmodules(git_index *index);
+    /// Notes the submodules that the index and one of the commit's parents have. Where libgit2
+    /// could not write a file, the index has whatever the memory held in place of its mode, a
+    /// submodule's for example. git_commit_tree, git_tree_entry_bypath.
+    /// @throws LibGit2Exception
+    CommitSubmodules(git_index *index, const std::vector<const git_commit *> &parents);
 
     /// Resolves submodules in conflict to ours, in memory, so that the refresh takes them as they
     /// stand. git_index_remove, git_index_add.

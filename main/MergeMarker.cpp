@@ -63,7 +63,7 @@ MergeMarker::~MergeMarker()
     ::unlink(path_.c_str());
 }
 
-bool hasMergeMarker(git_repository *repository, const git_oid &head, const git_oid &theirs)
+bool hasMergeMarker(git_repository *repository, const git_oid &theirs)
 {
     const std::string path = markerPath(repository);
     const FileDescriptor file(::open(path.c_str(), O_RDONLY | O_CLOEXEC));
@@ -78,7 +78,8 @@ bool hasMergeMarker(git_repository *repository, const git_oid &head, const git_o
         raiseSystemError(errno, "could not read '" + path + "'");
     }
     const bool isWhole = static_cast<std::size_t>(size) == text.size();
-    return !isWhole || std::string(text.data(), text.size()) == lineOf(head) + lineOf(theirs);
+    const std::string marker(text.data(), text.size());
+    return !isWhole || marker.substr(marker.size() / 2) == lineOf(theirs);
 }
 
 void removeMergeMarker(git_repository *repository) noexcept

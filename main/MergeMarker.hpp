@@ -28,10 +28,10 @@ class MergeMarker
     std::string path_;
 };
 
-/// Whether a merge of `theirs` into `head` has been cut short in this repository. A marker that was
-/// itself cut short counts.
+/// Whether a merge of `theirs` has been cut short in this repository, wherever HEAD was then: what
+/// is left of the merge outlives a switch of the branch. A marker that was itself cut short counts.
 /// @throws LibGit2Exception if that can't be found out
-bool hasMergeMarker(git_repository *repository, const git_oid &head, const git_oid &theirs);
+bool hasMergeMarker(git_repository *repository, const git_oid &theirs);
 
 /// Removes the marker of a merge that is over. To be called while the index is locked and no merge
 /// is under way.

@@ -165,7 +165,7 @@ bool isNothingTaken(git_repository *repository, const git_commit *ours, const gi
     const OwnedHandle<git_index> index = getRepositoryIndex(repository);
     Search search{oursTree.get(), index.get()};
     git_diff_options options{};
-    call(git_diff_options_init, &options, GIT_DIFF_OPTIONS_VERSION).value();
+    call(git_diff_options_init, &options, unsigned{GIT_DIFF_OPTIONS_VERSION}).value();
     options.notify_cb = lookAt;
     options.payload = &search;
     git_diff *raw = nullptr;
@@ -192,7 +192,7 @@ void refuseInterruptedMerge(git_repository *repository, const git_commit *ours,
         return;
     }
     const std::string name = git_oid_tostr_s(git_commit_id(theirs));
-    if (hasMergeMarker(repository, *git_commit_id(ours), *git_commit_id(theirs)))
+    if (hasMergeMarker(repository, *git_commit_id(theirs)))
     {
         raiseGitError(GIT_ERROR, GIT_ERROR_MERGE,
                       "the merge of " + name +

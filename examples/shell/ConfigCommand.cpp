@@ -24,7 +24,7 @@ class ConfigCommand : public Command
     void declare(CLI::App &line) override
     {
         line.add_flag("--write", writes_,
-                      "Install the tools that come along, over what stands there");
+                      "Install the tools that come along, in place of the values that are there");
         line.footer("Shows the merge and diff tools in Git's configuration of this user. One line "
                     "for each that is set:\n"
                     "its key, a tab, and its value. A file is merged by the automatic tool when "

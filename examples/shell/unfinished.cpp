@@ -93,8 +93,9 @@ void refuseHalfWay(CMAdapter &adapter)
 
 bool isMergeInterrupted(CMAdapter &adapter)
 {
-    // Of the library; it removes what is left of it once no merge is under way.
-    return isMerging(adapter) && stands(adapter, "vclink-merge");
+    // Of the library; it removes what is left of it once no merge is under way. git's merges leave
+    // the other file.
+    return isMerging(adapter) && stands(adapter, "vclink-merge") && !stands(adapter, "AUTO_MERGE");
 }
 
 std::string describeUnfinishedMerge(CMAdapter &adapter)
@@ -104,9 +105,13 @@ std::string describeUnfinishedMerge(CMAdapter &adapter)
         return {};
     }
     return isMergeInterrupted(adapter)
-               ? "A merge was interrupted before all of it was written, and can't be concluded. "
-                 "\"vclink-shell commit\"\nsays so, and names the commands that bring the working "
-                 "copy back as it was before."
+               ? std::string("A merge was interrupted before all of it was written, and can't be "
+                             "concluded. \"vclink-shell commit\"\nsays so, and names the commands "
+                             "that bring the working copy back as it was before.") +
+                     (stands(adapter, "index.lock")
+                          ? "\nRemove .git/index.lock first, unless another program is using Git "
+                            "here just now."
+                          : "")
                : "A merge is under way. Conclude it with \"vclink-shell commit\", or undo it with "
                  "\"git merge --abort\".";
 }

@@ -23,13 +23,14 @@ namespace
 using ChangeRule = Finding (*)(WorkingCopy &, const TreeChange &);
 using NoticeRule = Finding (*)(WorkingCopy &, const CheckoutNotice &);
 
-constexpr std::array<ChangeRule, 9> switchRules{
-    findBlockedWay,       findSpecialFile,      findIgnoredLink,
-    findForeignInFolder,  findMissingFolder,    findSubmodule,
-    findFileForSubmodule, findFolderOfOtherUse, findStagedBelowSubmodule};
+constexpr std::array<ChangeRule, 10> switchRules{
+    findBlockedWay,           findSpecialFile,         findIgnoredLink,      findForeignInFolder,
+    findMissingFolder,        findSubmodule,           findFileForSubmodule, findFolderOfOtherUse,
+    findFolderForDeletedFile, findStagedBelowSubmodule};
 constexpr std::array<ChangeRule, 2> stagedRules{findStagedSubmodule, findStagedContent};
-constexpr std::array<ChangeRule, 3> mergeRules{findBlockedWayOfMerge, findUntracked,
-                                               findFileForSubmodule};
+constexpr std::array<ChangeRule, 6> mergeRules{findBlockedWayOfMerge,    findUntracked,
+                                               findFileForSubmodule,     findSubmodule,
+                                               findFolderForDeletedFile, findSubmoduleAfterSibling};
 constexpr std::array<NoticeRule, 2> switchNoticeRules{findUnseen, findMissingFile};
 constexpr std::array<NoticeRule, 7> mergeNoticeRules{
     findEdit,          findUnseen,           findUntrackedNoticed, findForeignInFolderNoticed,

@@ -82,7 +82,7 @@ void SwitchSubmodules::settle(git_index *index) const
     for (const std::string &path : going_)
     {
         // It is gone already if the user has taken it out of the index, or a folder has come.
-        if (git_index_get_bypath(index, path.c_str(), 0) != nullptr)
+        if (isGitlink(git_index_get_bypath(index, path.c_str(), 0)))
         {
             check(git_index_remove, index, path.c_str(), 0);
         }

@@ -1,11 +1,13 @@
 // SPDX-License-Identifier: MIT
 #include "main/checkout/WorkingCopy.hpp"
 
+#include <cerrno>
 #include <cstddef>
 #include <filesystem>
 #include <memory>
 #include <utility>
 
+#include <dirent.h>
 #include <git2.h>
 #include <sys/stat.h>
 
@@ -65,6 +67,32 @@ Standing WorkingCopy::at(const std::string &name)
 bool WorkingCopy::holdsFiles(const std::string &folder) const
 {
     return vclink::git::holdsFiles(root_ + folder);
+}
+
+bool WorkingCopy::hasSiblingBeforeFolder(const std::string &folder) const
+{
+    const auto slash = folder.rfind('/');
+    const std::size_t start = slash == std::string::npos ? 0 : slash + 1;
+    const std::string name = folder.substr(start);
+    const std::string parent = root_ + folder.substr(0, start);
+    const std::unique_ptr<DIR, int (*)(DIR *)> siblings(::opendir(parent.c_str()), ::closedir);
+    if (siblings == nullptr)
+    {
+        return true;
+    }
+    errno = 0;
+    while (const dirent *const entry = ::readdir(siblings.get()))
+    {
+        const std::string sibling = entry->d_name;
+        const bool isLonger =
+            sibling.size() > name.size() && sibling.compare(0, name.size(), name) == 0;
+        if (isLonger && static_cast<unsigned char>(sibling[name.size()]) < '/')
+        {
+            return true;
+        }
+        errno = 0;
+    }
+    return errno != 0;
 }
 
 const WorkingCopy::Way &WorkingCopy::wayTo(const std::string &name)

@@ -41,6 +41,10 @@ class WorkingCopy
     /// See vclink::git::holdsFiles.
     bool holdsFiles(const std::string &folder) const;
 
+    /// Whether something beside the folder has a name that sorts between the folder's own and the
+    /// folder's with a slash at its end, e.g. "lib-1" for "lib". The folder is there.
+    bool hasSiblingBeforeFolder(const std::string &folder) const;
+
     /// What is above a name. `blocker` is empty where folders lead there, or where there is
     /// nothing; else it is the name of the first thing that keeps a file from being written there:
     /// something that is no folder, or a folder with files in the place of a file of HEAD.

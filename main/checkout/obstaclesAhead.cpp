@@ -130,12 +130,37 @@ Finding findStagedContent(WorkingCopy &copy, const TreeChange &change)
     {
         return {};
     }
-    // The same content in the file is a conflict, which libgit2 finds.
-    if (copy.at(change.path) != Standing::Nothing && !copy.isEdited(*entry))
+    // The same content in the file is a conflict, which libgit2 finds unless it is not told of what
+    // was there before.
+    if (!isGitlink(change.before) && copy.at(change.path) != Standing::Nothing &&
+        !copy.isEdited(*entry))
     {
         return {};
     }
     return stagedChangesOf(change.path);
+}
+
+Finding findFolderForDeletedFile(WorkingCopy &copy, const TreeChange &change)
+{
+    const bool isDeleted =
+        change.before != nullptr && !isGitlink(change.before) && change.after == nullptr;
+    const bool isInTheWay =
+        isDeleted && copy.holdsFiles(change.path) && !copy.isFolderInHead(change.path);
+    return isInTheWay ? inTheWay(change.path, Standing::Folder) : Finding();
+}
+
+Finding findSubmoduleAfterSibling(WorkingCopy &copy, const TreeChange &change)
+{
+    if (!isGitlink(change.before) || copy.at(change.path) != Standing::Folder)
+    {
+        return {};
+    }
+    const git_index_entry *const entry = copy.entryOf(change.path);
+    const bool isMovedByOurs = isGitlink(entry) && !isOf(*entry, change.before);
+    const bool isMergedAlone = isGitlink(change.after) && !isMovedByOurs;
+    const bool isInTheWay =
+        !isMergedAlone && copy.isInHead(change.path) && copy.hasSiblingBeforeFolder(change.path);
+    return isInTheWay ? inTheWay(change.path, Standing::Folder) : Finding();
 }
 
 Finding findBlockedWayOfMerge(WorkingCopy &copy, const TreeChange &change)

@@ -43,6 +43,10 @@ Finding findStagedContent(WorkingCopy &copy, const TreeChange &change);
 /// midst of its writing, or take a link for the folder.
 Finding findFileForSubmodule(WorkingCopy &copy, const TreeChange &change);
 
+/// A folder with files in the place of a file that is deleted: libgit2 deletes the folder if the
+/// working tree has a name that it sorts between the two, e.g. "file-1" for "file".
+Finding findFolderForDeletedFile(WorkingCopy &copy, const TreeChange &change);
+
 // Before a merge: `before` is of a merge base's tree, `after` of the other side's.
 
 /// As findBlockedWay; ignored links and files do not count.
@@ -50,6 +54,10 @@ Finding findBlockedWayOfMerge(WorkingCopy &copy, const TreeChange &change);
 /// Something untracked where the other side has a file, unless it is ignored or an empty folder. A
 /// folder is always in the way if ours has deleted the file and the other side has changed it.
 Finding findUntracked(WorkingCopy &copy, const TreeChange &change);
+/// The folder of a submodule that the other side has removed or replaced, or that both have moved,
+/// if the working tree has a name that libgit2 sorts between the submodule and its folder: it then
+/// deletes the folder, or does not see the change.
+Finding findSubmoduleAfterSibling(WorkingCopy &copy, const TreeChange &change);
 /// The first file with a change that Git hides, since the file is marked skip-worktree or
 /// assume-unchanged. A merge would undo it, whether the other side touches the file or not.
 Finding findHiddenEdit(WorkingCopy &copy);

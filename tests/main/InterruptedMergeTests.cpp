@@ -242,10 +242,24 @@ TEST_F(InterruptedMerge, IsToldByAMarkerThatWasCutShortItself)
 TEST_F(InterruptedMerge, IsNotToldByTheMarkerOfAnother)
 {
     makeDiverged();
-    repository_.write(mergeMarker, markerOf("main^", "topic"));
+    repository_.write(mergeMarker, markerOf("main", "main^"));
     repository_.git({"merge", "--quiet", "--no-commit", "topic"});
     repository_.remove(".git/AUTO_MERGE");
     expectConcluded();
+}
+
+TEST_F(InterruptedMerge, IsNotConcludedOnAnotherBranchEither)
+{
+    makeDiverged();
+    makeBranch("third", writing("third", "x"), "main^");
+    killMergeAt(2);
+    repository_.remove(indexLock);
+    repository_.git({"symbolic-ref", "HEAD", "refs/heads/third"});
+    repository_.git({"reset", "--quiet", "--", "."});
+    expectRefused();
+    repository_.write("copied", "x");
+    repository_.git({"add", "--all"});
+    expectRefused();
 }
 
 TEST_F(InterruptedMerge, IsOverOnceGitHasAbortedIt)

@@ -90,10 +90,11 @@ class VCLINK_GIT_EXPORT BranchManager
     /// A fast-forward is refused as switchBranch is. A merge that is none is refused before
     /// anything is written if any tracked file has uncommitted changes, even one that the merge
     /// does not touch, and if it would overwrite an untracked file, or a symbolic link, FIFO,
-    /// socket or device is in its way; the added text names the first file. The merge drivers may
-    /// have run by then. Missing files come back, ignored ones are overwritten. Folders of
-    /// submodules stay as they are; the merge commit has the submodules' commits as merged,
-    /// whatever is checked out in them.
+    /// socket or device is in its way; the added text names the first file, but for files that the
+    /// merge touches itself, which libgit2 only counts. The merge drivers may have run by then.
+    /// Missing files come back, ignored ones are overwritten. Folders of submodules stay as they
+    /// are; the merge commit has the submodules' commits as merged, whatever is checked out in
+    /// them.
     ///
     /// After conflicts the repository is in the state of a merge. Files in conflict have markers
     /// where both sides changed the same lines; a file that a merge command refused may have none,

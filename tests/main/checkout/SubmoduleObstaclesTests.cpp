@@ -208,6 +208,45 @@ TEST_F(SubmoduleObstacles, AreSubmodulesWithFilesThatBecomeAFolder)
     expectRefused(inTheWay("folder 'module'"), "topic");
 }
 
+/// libgit2 takes the submodule for gone then, and its folder for a new one.
+TEST_F(SubmoduleObstacles, OfAMergeAreFoldersBehindASiblingThatSortsBeforeThem)
+{
+    repository_.write("module-1", "x");
+    repository_.commitAll("a name that sorts before the folder's");
+    makeReplacing([] {});
+    populate();
+    repository_.write("ours", "x");
+    repository_.commitAll("on main");
+    repository_.write("module/mine", "mine\n");
+    expectMergeRefused(inTheWay("folder 'module'"));
+    repository_.remove("module-1");
+    repository_.commitAll("without it");
+    merge("topic");
+    EXPECT_EQ(parents().size(), 2U);
+    EXPECT_EQ(repository_.read("module/mine"), "mine\n");
+}
+
+TEST_F(SubmoduleObstacles, OfAMergeAreFoldersThatBecomeAFileBehindASibling)
+{
+    repository_.write("module-1", "x");
+    repository_.commitAll("a name that sorts before the folder's");
+    makeReplacing([this] { repository_.write("module", "theirs\n"); });
+    repository_.git({"submodule", "--quiet", "deinit", "--force", "module"});
+    repository_.write("ours", "x");
+    repository_.commitAll("on main");
+    expectMergeRefused(inTheWay("folder 'module'"));
+}
+
+TEST_F(SubmoduleObstacles, AreFilesThatAreStagedInThePlaceOfASubmodule)
+{
+    makeReplacing([] {});
+    repository_.git({"rm", "--quiet", "--cached", "module"});
+    repository_.remove("module");
+    repository_.write("module", "mine\n");
+    repository_.add({"module"});
+    expectSwitchRefused(staged("module"));
+}
+
 TEST_F(SubmoduleObstacles, AreStagedCommitsOfASubmodule)
 {
     addModule();

@@ -101,6 +101,19 @@ TEST_F(SwitchObstacles, AreNotFifosThatTheBranchDoesNotTouch)
     EXPECT_TRUE(fs::is_fifo(repository_ / "d/pipe"));
 }
 
+TEST_F(SwitchObstacles, AreFoldersInThePlaceOfAFileThatIsDeleted)
+{
+    repository_.write("other-1", "x");
+    repository_.commitAll("a name that sorts before the folder's");
+    makeTopic([this] { repository_.remove("other"); });
+    repository_.remove("other");
+    repository_.write("other/mine", "mine\n");
+    expectRefused(inTheWay("folder 'other'"));
+    EXPECT_FALSE(makeTwin().tryGit({"switch", "topic"}).succeeded());
+    repository_.remove("other");
+    expectSwitches();
+}
+
 TEST_F(SwitchObstacles, AreFoldersInThePlaceOfAFileThatBecomesAFolder)
 {
     makeTopic(folderOfOther());
