@@ -31,6 +31,7 @@ bool SurroundingDifference::explains(const Comparand &comparand) const
            means(place, comparand.place) && git == comparand.git && library == comparand.library;
 }
 
+// One table. NOLINTNEXTLINE(readability-function-size)
 const std::vector<SurroundingDifference> &surroundingDifferences()
 {
     const std::string through = "goes through";
