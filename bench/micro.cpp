@@ -8,7 +8,7 @@
 #include "error/logging/logger.hpp"
 #include "fl/filesystem/path.hpp"
 #include "fl/i18n/convert.hpp"
-#include "util/paths.hpp"
+#include "util/path/paths.hpp"
 
 namespace
 {

@@ -7,9 +7,9 @@
 #include <git2.h>
 
 #include "check.hpp"
-#include "error/errorUtil/GitDeleters.hpp"
+#include "error/errorUtil/OwnedHandle.hpp"
 #include "fl/i18n/convert.hpp"
-#include "main/GitAdapter.hpp"
+#include "main/files/GitAdapter.hpp"
 #include "support/HermeticEnvironment.hpp"
 #include "support/TemporaryFolder.hpp"
 #include "support/TestInteractor.hpp"

@@ -13,7 +13,7 @@
 #endif
 
 #include "check.hpp"
-#include "util/commandLine.hpp"
+#include "util/command/commandLine.hpp"
 
 using vclink::fuzz::require;
 

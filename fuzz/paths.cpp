@@ -16,9 +16,9 @@
 #include "support/GitRepository.hpp"
 #include "support/TemporaryFolder.hpp"
 #include "support/text.hpp"
-#include "util/PathspecArray.hpp"
-#include "util/paths.hpp"
-#include "util/pathspecEscape.hpp"
+#include "util/path/PathspecArray.hpp"
+#include "util/path/paths.hpp"
+#include "util/path/pathspecEscape.hpp"
 
 using fl::i18n::ustring_to_utf8;
 using fl::i18n::utf8_to_ustring;

@@ -14,12 +14,12 @@
 #include "error/errorUtil/gitString.hpp"
 #include "error/logging/ScopeTrace.hpp"
 #include "error/logging/logger.hpp"
-#include "main/BranchMerger.hpp"
 #include "main/checkout/CheckoutWatch.hpp"
+#include "main/merge/BranchMerger.hpp"
 #include "options/gitRecords.hpp"
-#include "util/IndexLock.hpp"
-#include "util/referenceLocks.hpp"
-#include "util/repository.hpp"
+#include "util/lock/IndexLock.hpp"
+#include "util/lock/referenceLocks.hpp"
+#include "util/repository/repository.hpp"
 
 namespace vclink::git
 {

@@ -7,7 +7,7 @@
 
 #include <git2/oid.h>
 
-#include "main/GitAdapter.hpp"
+#include "main/files/GitAdapter.hpp"
 #include "vclink/git/BranchManager.hpp"
 
 namespace vclink::git

@@ -3,8 +3,8 @@
 
 #include <utility>
 
-#include "main/GitAdapter.hpp"
-#include "util/repository.hpp"
+#include "main/files/GitAdapter.hpp"
+#include "util/repository/repository.hpp"
 #include "vclink/git/GitWorkingCopyGenerator.hpp"
 #include "vclink/git/LibGit2Guard.hpp"
 

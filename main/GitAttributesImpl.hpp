@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
-#include "main/GitAdapter.hpp"
+#include "main/files/GitAdapter.hpp"
 #include "vclink/git/GitAttributes.hpp"
 
 namespace vclink::git

@@ -11,10 +11,10 @@
 #include "error/logging/ScopeTrace.hpp"
 #include "error/logging/logger.hpp"
 #include "fl/i18n/convert.hpp"
+#include "main/remote/SigpipeBlock.hpp"
 #include "options/GitCallbacks.hpp"
 #include "options/gitRecords.hpp"
 #include "scl/core/memory/make_unique_incomplete.hpp"
-#include "util/SigpipeGuard.hpp"
 #include "vclink/git/LibGit2Guard.hpp"
 
 namespace vclink::git

@@ -5,7 +5,7 @@
 
 #include <git2/errors.h>
 
-#include "error/errorUtil/setGitError.hpp"
+#include "error/errorUtil/libgit2Errors.hpp"
 #include "error/logging/logger.hpp"
 
 namespace vclink::git

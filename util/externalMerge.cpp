@@ -17,8 +17,8 @@
 #include "error/logging/logger.hpp"
 #include "fl/filesystem/fstream.hpp"
 #include "fl/i18n/convert.hpp"
-#include "util/ScopedCleanup.hpp"
-#include "util/runCommand.hpp"
+#include "util/command/runCommand.hpp"
+#include "util/scope/ScopedCleanup.hpp"
 #include "util/temporaryFile.hpp"
 
 namespace vclink::git

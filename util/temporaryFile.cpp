@@ -16,8 +16,8 @@
 #include "fl/filesystem/fstream.hpp"
 #include "fl/filesystem/operations.hpp"
 #include "fl/i18n/convert.hpp"
-#include "util/FileDescriptor.hpp"
-#include "util/ScopedCleanup.hpp"
+#include "util/scope/FileDescriptor.hpp"
+#include "util/scope/ScopedCleanup.hpp"
 
 namespace vclink::git
 {

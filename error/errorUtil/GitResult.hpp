@@ -3,9 +3,9 @@
 
 #include <boost/outcome/basic_result.hpp>
 
-#include "error/errorUtil/GitDeleters.hpp"
 #include "error/errorUtil/GitErrorPolicy.hpp"
-#include "error/errorUtil/setGitError.hpp"
+#include "error/errorUtil/OwnedHandle.hpp"
+#include "error/errorUtil/libgit2Errors.hpp"
 #include "vclink/git/GitError.hpp"
 
 namespace vclink::git

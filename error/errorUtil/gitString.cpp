@@ -3,7 +3,7 @@
 
 #include <git2/errors.h>
 
-#include "error/errorUtil/setGitError.hpp"
+#include "error/errorUtil/libgit2Errors.hpp"
 #include "fl/i18n/convert.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
 

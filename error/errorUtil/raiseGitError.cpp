@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "error/errorUtil/raiseGitError.hpp"
 
-#include "error/errorUtil/setGitError.hpp"
+#include "error/errorUtil/libgit2Errors.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
 
 namespace vclink::git

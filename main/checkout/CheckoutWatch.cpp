@@ -10,10 +10,10 @@
 
 #include "error/errorUtil/GitResult.hpp"
 #include "error/errorUtil/callbackException.hpp"
-#include "error/errorUtil/setGitError.hpp"
+#include "error/errorUtil/libgit2Errors.hpp"
 #include "main/checkout/gitlinks.hpp"
 #include "main/checkout/obstaclesAhead.hpp"
-#include "util/repository.hpp"
+#include "util/repository/repository.hpp"
 
 namespace vclink::git
 {

@@ -7,7 +7,7 @@
 #include <git2/checkout.h>
 #include <git2/types.h>
 
-#include "error/errorUtil/GitDeleters.hpp"
+#include "error/errorUtil/OwnedHandle.hpp"
 #include "main/checkout/ClearedWay.hpp"
 #include "main/checkout/MergeSubmodules.hpp"
 #include "main/checkout/Obstacle.hpp"

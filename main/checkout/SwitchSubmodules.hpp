@@ -7,7 +7,7 @@
 #include <git2/oid.h>
 #include <git2/types.h>
 
-#include "error/errorUtil/GitDeleters.hpp"
+#include "error/errorUtil/OwnedHandle.hpp"
 #include "main/checkout/WorkingCopy.hpp"
 #include "main/checkout/treeChanges.hpp"
 

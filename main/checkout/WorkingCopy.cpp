@@ -12,8 +12,8 @@
 #include <sys/stat.h>
 
 #include "error/errorUtil/GitResult.hpp"
-#include "main/checkout/ids.hpp"
-#include "util/repository.hpp"
+#include "util/repository/objectIds.hpp"
+#include "util/repository/repository.hpp"
 
 namespace vclink::git
 {

@@ -8,9 +8,9 @@
 #include <git2/object.h>
 #include <git2/types.h>
 
-#include "error/errorUtil/GitDeleters.hpp"
-#include "main/Head.hpp"
+#include "error/errorUtil/OwnedHandle.hpp"
 #include "main/checkout/standing.hpp"
+#include "util/repository/Head.hpp"
 
 namespace vclink::git
 {

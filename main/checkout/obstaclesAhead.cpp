@@ -7,7 +7,7 @@
 #include <sys/stat.h>
 
 #include "main/checkout/gitlinks.hpp"
-#include "main/checkout/ids.hpp"
+#include "util/repository/objectIds.hpp"
 
 namespace vclink::git
 {

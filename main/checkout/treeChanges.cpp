@@ -8,8 +8,8 @@
 #include <git2/tree.h>
 
 #include "error/errorUtil/GitResult.hpp"
-#include "main/checkout/ids.hpp"
-#include "util/repository.hpp"
+#include "util/repository/objectIds.hpp"
+#include "util/repository/repository.hpp"
 
 namespace vclink::git
 {

@@ -37,6 +37,16 @@ TEST_F(Repository, KeepsTheOrderOfItsLayers)
     EXPECT_THAT(findBrokenLayers(tree), IsEmpty());
 }
 
+TEST_F(Repository, KeepsTheOrderOfItsRooms)
+{
+    EXPECT_THAT(findBrokenRooms(tree), IsEmpty());
+}
+
+TEST_F(Repository, NeedsEachArrowBetweenItsRooms)
+{
+    EXPECT_THAT(findUnusedArrows(tree), IsEmpty());
+}
+
 TEST_F(Repository, ExportsHeadersThatShowNoLibraryBelow)
 {
     EXPECT_THAT(findForeignIncludesOfExportedHeaders(tree), IsEmpty());

@@ -15,8 +15,10 @@ namespace
 {
 
 using namespace vclink::test;
+using testing::Contains;
 using testing::ElementsAre;
 using testing::IsEmpty;
+using testing::Not;
 
 /// A tree in which nothing includes anything, with a file for each layer.
 SourceTree makeTree()
@@ -123,6 +125,45 @@ INSTANTIATE_TEST_SUITE_P(
         Arrow{"examples/shell/main.cpp", "vclink_host/log.hpp",
               "host/include/vclink_host/log.hpp"}),
     nameOf);
+
+TEST(Rooms, IncludeThemselvesAndRoomsThatTheTableGivesThem)
+{
+    const SourceTree tree{{"util/scope/Owner.hpp", ""},
+                          {"util/lock/Copy.hpp", "#include \"util/scope/Owner.hpp\"\n"},
+                          {"util/lock/Lock.cpp", "#include \"util/lock/Copy.hpp\"\n"
+                                                 "#include \"util/scope/Owner.hpp\"\n"},
+                          {"main/files/Adapter.hpp", "#include \"util/lock/Copy.hpp\"\n"},
+                          {"main/merge/Merger.hpp", "#include \"main/files/Adapter.hpp\"\n"}};
+    EXPECT_THAT(findBrokenRooms(tree), IsEmpty());
+}
+
+TEST(Rooms, IncludeNoneAboveAndNoneBeside)
+{
+    const SourceTree tree{{"util/lock/Lock.hpp", ""},
+                          {"util/path/paths.cpp", "#include \"util/lock/Lock.hpp\"\n"},
+                          {"util/scope/Owner.cpp", "#include \"../lock/Lock.hpp\"\n"},
+                          {"main/merge/Merger.hpp", ""},
+                          {"main/files/Adapter.cpp", "#include \"main/merge/Merger.hpp\"\n"}};
+    EXPECT_THAT(findBrokenRooms(tree),
+                ElementsAre("main/files/Adapter.cpp includes main/merge/Merger.hpp",
+                            "util/path/paths.cpp includes util/lock/Lock.hpp",
+                            "util/scope/Owner.cpp includes util/lock/Lock.hpp"));
+}
+
+TEST(Rooms, AreAllInTheTable)
+{
+    EXPECT_THAT(findBrokenRooms({{"main/other/Thing.cpp", ""}, {"tests/other/Thing.cpp", ""}}),
+                ElementsAre("main/other/Thing.cpp is in a folder that is no room"));
+}
+
+TEST(Rooms, HaveNoArrowsThatNobodyNeeds)
+{
+    const SourceTree tree{{"util/scope/Owner.hpp", ""},
+                          {"util/lock/Lock.cpp", "#include \"util/scope/Owner.hpp\"\n"}};
+    const auto unused = findUnusedArrows(tree);
+    EXPECT_THAT(unused, Contains("util/lock includes nothing of util/repository"));
+    EXPECT_THAT(unused, Not(Contains("util/lock includes nothing of util/scope")));
+}
 
 TEST(ExportedHeaders, IncludeNothingOfTheLibrariesBelow)
 {

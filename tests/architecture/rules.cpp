@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "rules.hpp"
 
+#include <algorithm>
 #include <map>
 #include <set>
 #include <sstream>
@@ -22,6 +23,70 @@ const std::map<std::string, std::set<std::string>> &allowedLayers()
         {"main", {"host", "include", "error", "util", "options", "main"}},
         {"examples", {"host", "include", "examples"}}};
     return allowed;
+}
+
+struct Room
+{
+    std::string folder;
+    std::set<std::string> below;
+};
+
+/// From the bottom up. A room includes rooms that come before it only, so that there is no circle.
+const std::vector<Room> &rooms()
+{
+    static const std::vector<Room> table{
+        {"error/logging", {}},
+        {"error/errorUtil", {"error/logging"}},
+        {"error", {"error/logging"}},
+        {"options", {}},
+        {"util/path", {}},
+        {"util/repository", {}},
+        {"util/scope", {}},
+        {"util/lock", {"util/repository", "util/scope"}},
+        {"util/command", {"util/scope"}},
+        {"util", {"util/command", "util/scope"}},
+        {"main/checkout", {}},
+        {"main/mergeState", {}},
+        {"main/files", {"main/checkout", "main/mergeState"}},
+        {"main/merge", {"main/checkout", "main/files", "main/mergeState"}},
+        {"main/remote", {"main/files"}},
+        {"main", {"main/checkout", "main/files", "main/merge", "main/remote"}}};
+    return table;
+}
+
+std::vector<Room>::const_iterator findRoom(const std::string &folder)
+{
+    return std::find_if(rooms().begin(), rooms().end(),
+                        [&](const Room &room) { return room.folder == folder; });
+}
+
+std::string folderOf(const std::string &file)
+{
+    return file.substr(0, file.rfind('/'));
+}
+
+bool mayInclude(std::vector<Room>::const_iterator room, const std::string &folder)
+{
+    return room->folder == folder || (room->below.count(folder) != 0 && findRoom(folder) < room);
+}
+
+/// What a file includes of its own layer, each with its folder.
+std::map<std::string, std::string> includedOfLayer(const SourceTree &tree, const std::string &file)
+{
+    std::map<std::string, std::string> targets;
+    for (const auto &name : findIncludes(tree.at(file)))
+    {
+        const auto target = resolveInclude(tree, file, name);
+        if (!target.empty() && layerOf(target) == layerOf(file))
+            targets.emplace(target, folderOf(target));
+    }
+    return targets;
+}
+
+bool hasRooms(const std::string &file)
+{
+    static const std::set<std::string> layers{"error", "util", "options", "main"};
+    return layers.count(layerOf(file)) != 0;
 }
 
 bool isOfLibrary(const std::string &file)
@@ -86,6 +151,52 @@ Findings findBrokenLayers(const SourceTree &tree)
             const auto target = resolveInclude(tree, file, name);
             if (!target.empty() && allowed->second.count(layerOf(target)) == 0)
                 findings.push_back(included(file, target));
+        }
+    }
+    return findings;
+}
+
+Findings findBrokenRooms(const SourceTree &tree)
+{
+    Findings findings;
+    for (const auto &entry : tree)
+    {
+        const std::string &file = entry.first;
+        if (!hasRooms(file))
+            continue;
+        const auto room = findRoom(folderOf(file));
+        if (room == rooms().end())
+        {
+            findings.push_back(file + " is in a folder that is no room");
+            continue;
+        }
+        for (const auto &[target, folder] : includedOfLayer(tree, file))
+        {
+            if (!mayInclude(room, folder))
+                findings.push_back(included(file, target));
+        }
+    }
+    return findings;
+}
+
+Findings findUnusedArrows(const SourceTree &tree)
+{
+    std::set<std::pair<std::string, std::string>> used;
+    for (const auto &entry : tree)
+    {
+        const std::string &file = entry.first;
+        if (!hasRooms(file))
+            continue;
+        for (const auto &[target, folder] : includedOfLayer(tree, file))
+            used.emplace(folderOf(file), folder);
+    }
+    Findings findings;
+    for (const auto &room : rooms())
+    {
+        for (const auto &folder : room.below)
+        {
+            if (used.count({room.folder, folder}) == 0)
+                findings.push_back(room.folder + " includes nothing of " + folder);
         }
     }
     return findings;

@@ -17,6 +17,13 @@ using Findings = std::vector<std::string>;
 /// below it only. The exported headers stand on the host's alone, and the examples on these two.
 Findings findBrokenLayers(const SourceTree &tree);
 
+/// Within a layer each folder is a room: a file includes files of its own room, and of those that
+/// the table in rules.cpp gives to it. A folder that the table does not have is a finding too.
+Findings findBrokenRooms(const SourceTree &tree);
+
+/// What that table allows and no file needs.
+Findings findUnusedArrows(const SourceTree &tree);
+
 /// Beside the host's headers and each other the exported headers include the standard library's,
 /// and of Boost what holds a value: optional and variant.
 Findings findForeignIncludesOfExportedHeaders(const SourceTree &tree);

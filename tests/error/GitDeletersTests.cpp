@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-#include "error/errorUtil/GitDeleters.hpp"
+#include "error/errorUtil/OwnedHandle.hpp"
 
 #include <string>
 #include <type_traits>

@@ -9,7 +9,7 @@
 #include <gtest/gtest.h>
 
 #include "error/HermeticLibGit2.hpp"
-#include "error/errorUtil/setGitError.hpp"
+#include "error/errorUtil/libgit2Errors.hpp"
 #include "fl/i18n/convert.hpp"
 #include "vclink/git/GitError.hpp"
 

@@ -11,7 +11,7 @@
 #include <gtest/gtest.h>
 
 #include "error/HermeticLibGit2.hpp"
-#include "error/errorUtil/setGitError.hpp"
+#include "error/errorUtil/libgit2Errors.hpp"
 #include "error/logging/severity.hpp"
 #include "support/LogCapture.hpp"
 #include "vclink/git/LibGit2Exception.hpp"

@@ -11,7 +11,7 @@
 
 #include "error/HermeticLibGit2.hpp"
 #include "error/errorUtil/GitResult.hpp"
-#include "error/errorUtil/setGitError.hpp"
+#include "error/errorUtil/libgit2Errors.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
 
 namespace vclink::git

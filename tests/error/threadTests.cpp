@@ -14,7 +14,7 @@
 #include "error/HermeticLibGit2.hpp"
 #include "error/errorUtil/GitErrorPolicy.hpp"
 #include "error/errorUtil/callbackException.hpp"
-#include "error/errorUtil/setGitError.hpp"
+#include "error/errorUtil/libgit2Errors.hpp"
 #include "error/logging/ScopeTrace.hpp"
 #include "support/LogCapture.hpp"
 #include "vclink/git/LibGit2Exception.hpp"

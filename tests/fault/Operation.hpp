@@ -7,7 +7,7 @@
 #include <string>
 #include <vector>
 
-#include "main/GitAdapter.hpp"
+#include "main/files/GitAdapter.hpp"
 #include "support/GitRepository.hpp"
 #include "support/TestInteractor.hpp"
 

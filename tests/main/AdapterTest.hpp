@@ -6,7 +6,7 @@
 #include <memory>
 #include <string>
 
-#include "main/GitAdapter.hpp"
+#include "main/files/GitAdapter.hpp"
 #include "support/GitTest.hpp"
 #include "support/LibGit2Session.hpp"
 #include "support/TestInteractor.hpp"

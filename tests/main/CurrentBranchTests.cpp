@@ -14,7 +14,7 @@
 #include "OtherAdapter.hpp"
 #include "error/VirtualTable.hpp"
 #include "main/BasicBranchManager.hpp"
-#include "main/BranchMerger.hpp"
+#include "main/merge/BranchMerger.hpp"
 #include "support/Descriptors.hpp"
 
 namespace

@@ -11,7 +11,7 @@
 #include <gtest/gtest.h>
 
 #include "RemoteTest.hpp"
-#include "error/errorUtil/setGitError.hpp"
+#include "error/errorUtil/libgit2Errors.hpp"
 #include "support/libgit2/LibGit2Recorder.hpp"
 #include "support/text.hpp"
 #include "vclink/git/GitAdapterFactory.hpp"

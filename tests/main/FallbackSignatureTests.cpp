@@ -11,8 +11,8 @@
 
 #include "CommitTest.hpp"
 #include "HostName.hpp"
-#include "main/commitIdentity.hpp"
-#include "util/repository.hpp"
+#include "main/files/commitIdentity.hpp"
+#include "util/repository/repository.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
 
 namespace

@@ -6,7 +6,7 @@
 #include <git2.h>
 #include <gtest/gtest.h>
 
-#include "main/StatusCallbacks.hpp"
+#include "main/files/StatusCallbacks.hpp"
 #include "vclink/FileState.hpp"
 
 namespace

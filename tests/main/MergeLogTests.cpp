@@ -8,7 +8,7 @@
 
 #include "MergeTest.hpp"
 #include "error/logging/severity.hpp"
-#include "main/BranchMerger.hpp"
+#include "main/merge/BranchMerger.hpp"
 #include "support/LogCapture.hpp"
 
 namespace

@@ -14,9 +14,9 @@
 
 #include "BranchCallsTest.hpp"
 #include "LateCommit.hpp"
-#include "main/Head.hpp"
 #include "support/libgit2/LibGit2Recorder.hpp"
 #include "support/text.hpp"
+#include "util/repository/Head.hpp"
 
 namespace
 {

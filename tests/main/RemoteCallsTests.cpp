@@ -12,7 +12,7 @@
 
 #include "RemoteTest.hpp"
 #include "TestOptionsFactory.hpp"
-#include "error/errorUtil/setGitError.hpp"
+#include "error/errorUtil/libgit2Errors.hpp"
 #include "error/logging/severity.hpp"
 #include "support/LogCapture.hpp"
 #include "support/libgit2/LibGit2Recorder.hpp"

@@ -14,7 +14,7 @@
 #include "TestOptionsFactory.hpp"
 #include "callNames.hpp"
 #include "support/libgit2/LibGit2Recorder.hpp"
-#include "util/pathspecEscape.hpp"
+#include "util/path/pathspecEscape.hpp"
 #include "vclink/util/exception/CancelledOperationException.hpp"
 
 namespace

@@ -10,7 +10,7 @@
 #include "StagingTest.hpp"
 #include "callNames.hpp"
 #include "support/libgit2/LibGit2Recorder.hpp"
-#include "util/pathspecEscape.hpp"
+#include "util/path/pathspecEscape.hpp"
 
 namespace
 {

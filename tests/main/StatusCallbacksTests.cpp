@@ -6,7 +6,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "main/StatusCallbacks.hpp"
+#include "main/files/StatusCallbacks.hpp"
 #include "options/Callbacks.hpp"
 #include "support/text.hpp"
 

@@ -15,7 +15,7 @@
 #include "error/errorUtil/GitErrorPolicy.hpp"
 #include "error/errorUtil/GitResult.hpp"
 #include "error/errorUtil/callbackException.hpp"
-#include "error/errorUtil/setGitError.hpp"
+#include "error/errorUtil/libgit2Errors.hpp"
 #include "options/Callbacks.hpp"
 #include "support/LogCapture.hpp"
 #include "support/libgit2/LibGit2Recorder.hpp"

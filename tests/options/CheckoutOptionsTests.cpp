@@ -13,7 +13,7 @@
 #include "error/CoreFilter.hpp"
 #include "error/HermeticLibGit2.hpp"
 #include "error/errorUtil/callbackException.hpp"
-#include "error/errorUtil/setGitError.hpp"
+#include "error/errorUtil/libgit2Errors.hpp"
 #include "error/logging/severity.hpp"
 #include "options/bytesOf.hpp"
 #include "options/gitRecords.hpp"

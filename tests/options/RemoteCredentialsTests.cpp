@@ -11,7 +11,7 @@
 
 #include "error/HermeticLibGit2.hpp"
 #include "error/errorUtil/callbackException.hpp"
-#include "error/errorUtil/setGitError.hpp"
+#include "error/errorUtil/libgit2Errors.hpp"
 #include "error/logging/severity.hpp"
 #include "options/gitRecords.hpp"
 #include "support/LogCapture.hpp"

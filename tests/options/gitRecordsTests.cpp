@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-#include "error/errorUtil/setGitError.hpp"
+#include "error/errorUtil/libgit2Errors.hpp"
 #include "options/gitRecords.hpp"
 
 #include <cstring>

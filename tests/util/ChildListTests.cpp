@@ -11,7 +11,7 @@
 
 #include "support/NothingLeft.hpp"
 #include "support/interposition.hpp"
-#include "util/StartGuard.hpp"
+#include "util/command/FailedStartCleanup.hpp"
 
 namespace
 {

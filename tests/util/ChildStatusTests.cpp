@@ -10,7 +10,7 @@
 
 #include "support/NothingLeft.hpp"
 #include "support/SignalAction.hpp"
-#include "util/ChildStatus.hpp"
+#include "util/command/ChildStatus.hpp"
 
 namespace
 {

@@ -5,7 +5,7 @@
 #include <gtest/gtest.h>
 #include <unistd.h>
 
-#include "util/commandLine.hpp"
+#include "util/command/commandLine.hpp"
 
 namespace
 {

@@ -17,8 +17,8 @@
 #include "support/LibGit2Session.hpp"
 #include "support/UnprivilegedUser.hpp"
 #include "support/text.hpp"
-#include "util/IndexLock.hpp"
-#include "util/repository.hpp"
+#include "util/lock/IndexLock.hpp"
+#include "util/repository/repository.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
 
 namespace

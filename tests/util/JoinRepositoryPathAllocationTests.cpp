@@ -6,7 +6,7 @@
 
 #include "support/AllocationCounter.hpp"
 #include "support/text.hpp"
-#include "util/paths.hpp"
+#include "util/path/paths.hpp"
 
 namespace
 {

@@ -8,7 +8,7 @@
 #include "fl/filesystem/detail/path_text.hpp"
 #include "fl/i18n/convert.hpp"
 #include "support/text.hpp"
-#include "util/paths.hpp"
+#include "util/path/paths.hpp"
 
 namespace
 {

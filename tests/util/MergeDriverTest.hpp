@@ -5,7 +5,7 @@
 #include <string>
 #include <vector>
 
-#include "error/errorUtil/GitDeleters.hpp"
+#include "error/errorUtil/OwnedHandle.hpp"
 #include "support/GitTest.hpp"
 #include "support/LibGit2Session.hpp"
 #include "support/LogCapture.hpp"

@@ -10,7 +10,7 @@
 
 #include "support/GitTest.hpp"
 #include "support/text.hpp"
-#include "util/PathspecArray.hpp"
+#include "util/path/PathspecArray.hpp"
 
 namespace
 {

@@ -10,8 +10,8 @@
 #include "support/GitTest.hpp"
 #include "support/LibGit2Session.hpp"
 #include "support/text.hpp"
-#include "util/PathspecArray.hpp"
-#include "util/pathspecEscape.hpp"
+#include "util/path/PathspecArray.hpp"
+#include "util/path/pathspecEscape.hpp"
 
 namespace
 {

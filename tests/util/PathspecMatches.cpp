@@ -7,7 +7,7 @@
 
 #include <git2.h>
 
-#include "error/errorUtil/GitDeleters.hpp"
+#include "error/errorUtil/OwnedHandle.hpp"
 
 namespace vclink::test
 {

@@ -6,7 +6,7 @@
 #include <vector>
 
 #include "support/GitRepository.hpp"
-#include "util/PathspecArray.hpp"
+#include "util/path/PathspecArray.hpp"
 
 namespace vclink::test
 {

@@ -9,7 +9,7 @@
 #include "support/GitTest.hpp"
 #include "support/LibGit2Session.hpp"
 #include "support/text.hpp"
-#include "util/PathspecArray.hpp"
+#include "util/path/PathspecArray.hpp"
 
 namespace
 {

@@ -12,7 +12,7 @@
 
 #include "RunCommandTest.hpp"
 #include "support/WorkingFolder.hpp"
-#include "util/programLookup.hpp"
+#include "util/command/programLookup.hpp"
 
 namespace
 {

@@ -8,8 +8,8 @@
 #include "support/GitTest.hpp"
 #include "support/LibGit2Session.hpp"
 #include "support/text.hpp"
-#include "util/referenceLocks.hpp"
-#include "util/repository.hpp"
+#include "util/lock/referenceLocks.hpp"
+#include "util/repository/repository.hpp"
 
 namespace
 {

@@ -13,7 +13,7 @@
 #include "support/GitTest.hpp"
 #include "support/WorkingFolder.hpp"
 #include "support/text.hpp"
-#include "util/paths.hpp"
+#include "util/path/paths.hpp"
 
 namespace
 {

@@ -7,7 +7,7 @@
 #include "support/GitTest.hpp"
 #include "support/LibGit2Session.hpp"
 #include "support/text.hpp"
-#include "util/repository.hpp"
+#include "util/repository/repository.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
 
 namespace

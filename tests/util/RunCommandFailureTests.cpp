@@ -18,8 +18,8 @@
 #include "support/DescriptorLimit.hpp"
 #include "support/LogCapture.hpp"
 #include "support/UnprivilegedUser.hpp"
+#include "util/command/runCommand.hpp"
 #include "util/processError.hpp"
-#include "util/runCommand.hpp"
 
 namespace
 {

@@ -22,8 +22,8 @@
 #include "support/SignalAction.hpp"
 #include "support/ThousandDescriptors.hpp"
 #include "support/WorkingFolder.hpp"
+#include "util/command/runCommand.hpp"
 #include "util/processError.hpp"
-#include "util/runCommand.hpp"
 
 namespace
 {

@@ -8,7 +8,7 @@
 
 #include "RunCommandTest.hpp"
 #include "support/Command.hpp"
-#include "util/runCommand.hpp"
+#include "util/command/runCommand.hpp"
 
 namespace
 {

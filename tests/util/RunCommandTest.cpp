@@ -4,8 +4,8 @@
 #include <gtest/gtest.h>
 
 #include "support/LogCapture.hpp"
+#include "util/command/runCommand.hpp"
 #include "util/processError.hpp"
-#include "util/runCommand.hpp"
 
 namespace vclink::test
 {

@@ -8,7 +8,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "util/ScopedCleanup.hpp"
+#include "util/scope/ScopedCleanup.hpp"
 
 namespace
 {

@@ -12,7 +12,7 @@
 #include "ObstacleTest.hpp"
 #include "error/errorUtil/GitResult.hpp"
 #include "support/text.hpp"
-#include "util/repository.hpp"
+#include "util/repository/repository.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
 
 namespace

@@ -11,7 +11,7 @@
 
 #include "../BranchTest.hpp"
 #include "support/text.hpp"
-#include "util/repository.hpp"
+#include "util/repository/repository.hpp"
 
 namespace
 {

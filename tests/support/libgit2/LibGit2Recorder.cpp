@@ -8,7 +8,7 @@
 #include <gtest/gtest.h>
 
 #include "Passing.hpp"
-#include "error/errorUtil/setGitError.hpp"
+#include "error/errorUtil/libgit2Errors.hpp"
 
 namespace vclink::test
 {

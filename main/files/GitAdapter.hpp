@@ -1,0 +1,83 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <cstddef>
+#include <memory>
+#include <vector>
+
+#include <git2/types.h>
+
+#include "error/errorUtil/OwnedHandle.hpp"
+#include "fl/filesystem/path.hpp"
+#include "fl/ustring.hpp"
+#include "options/GitCallbacks.hpp"
+#include "vclink/ApplicationInteractor.hpp"
+#include "vclink/CMAdapter.hpp"
+#include "vclink/FileStateMap.hpp"
+#include "vclink/git/GitOptionsFactory.hpp"
+#include "vclink/git/LibGit2Guard.hpp"
+
+namespace vclink::git
+{
+
+class IndexLock;
+struct MergeSides;
+
+/// The back end of one working copy. Holds what it needs to open the repository and to build option
+/// records, and nothing of the repository itself.
+class GitAdapter : public vclink::CMAdapter
+{
+  public:
+    /// @param interactor not null
+    GitAdapter(const upath &root, std::shared_ptr<ApplicationInteractor> interactor);
+    /// @param factory not null, and made with an interactor
+    GitAdapter(const upath &root, std::shared_ptr<GitOptionsFactory> factory);
+    ~GitAdapter() override;
+
+    /// What each operation promises: the page adapter_operations in
+    /// vclink/git/GitAdapterFactory.hpp, a section for each.
+    /// @{
+    void commit(const upath &folder, const ustring &message) override;
+    void addFiles(const std::vector<upath> &files) override;
+    void removeFiles(const std::vector<upath> &files) override;
+    void revertFiles(const std::vector<upath> &files) override;
+    void markResolved(const upath &file) override;
+    FileStateMap getFileStates(const std::vector<upath> &files) override;
+    FileStateMap getFolderStates(const upath &folder) override;
+    const upath &getRootFolder() override;
+    /// @}
+
+    /// A repository opened for the caller, who owns it.
+    /// @throws LibGit2Exception
+    [[nodiscard]] OwnedHandle<git_repository> getRepository() const;
+    std::shared_ptr<GitOptionsFactory> getOptionsFactory() const;
+    GitCallbacks &getCallbacks() const;
+    std::shared_ptr<ApplicationInteractor> getInteractor() const;
+    /// Lets commit() refuse to make any other commit than the one that concludes this merge, and
+    /// take submodules as the index has them, whatever is checked out in them.
+    /// @param sides outlive the commit; null for no merge
+    void expectMerge(const MergeSides *sides) noexcept;
+
+  private:
+    FileStateMap collectFileStates(char **pathspecStrings, std::size_t pathspecCount);
+    void addToIndex(const std::vector<upath> &files);
+    void removeFromIndex(const std::vector<upath> &files);
+    /// @param head one of the parents; null if HEAD gives no commit
+    void createCommit(git_repository *repository, const ustring &message, const git_commit *head,
+                      const std::vector<const git_commit *> &parents, IndexLock &lock);
+    void refreshForCommit(git_repository *repository, git_index *index, const git_commit *head,
+                          const std::vector<const git_commit *> &parents) const;
+    /// @return the states that it looked at
+    FileStateMap throwIfConflicted(const std::vector<upath> &files);
+
+    // The guard comes first and goes last: all use of libgit2 by the other members ends before it.
+    LibGit2Guard guard_;
+    upath root_;
+    std::shared_ptr<GitOptionsFactory> optionsFactory_;
+    std::unique_ptr<GitCallbacks> callbacks_;
+    std::shared_ptr<ApplicationInteractor> interactor_;
+    /// Null except while a merge commits.
+    const MergeSides *expectedMerge_ = nullptr;
+};
+
+} // namespace vclink::git

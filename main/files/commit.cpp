@@ -1,0 +1,169 @@
+// SPDX-License-Identifier: MIT
+// GitAdapter::commit: a commit of all tracked files, which also concludes a merge.
+#include <string>
+#include <vector>
+
+#include <git2/commit.h>
+#include <git2/errors.h>
+#include <git2/index.h>
+#include <git2/object.h>
+#include <git2/oid.h>
+#include <git2/repository.h>
+
+#include "error/errorUtil/GitResult.hpp"
+#include "error/errorUtil/callbackException.hpp"
+#include "fl/i18n/convert.hpp"
+#include "main/files/CommitSubmodules.hpp"
+#include "main/files/GitAdapter.hpp"
+#include "main/files/commitIdentity.hpp"
+#include "main/files/indexRefresh.hpp"
+#include "main/mergeState/MergeMarker.hpp"
+#include "main/mergeState/interruptedMerge.hpp"
+#include "main/mergeState/mergeHead.hpp"
+#include "util/lock/IndexLock.hpp"
+#include "util/lock/referenceLocks.hpp"
+#include "util/repository/repository.hpp"
+
+namespace vclink::git
+{
+namespace
+{
+
+int collectMergeHead(const git_oid *id, void *payload) noexcept
+{
+    try
+    {
+        static_cast<std::vector<git_oid> *>(payload)->push_back(*id);
+        return 0;
+    }
+    catch (...)
+    {
+        return parkCallbackException();
+    }
+}
+
+std::vector<OwnedHandle<git_commit>> lookupMergeHeads(git_repository *repository)
+{
+    std::vector<git_oid> ids;
+    call(git_repository_mergehead_foreach, repository, collectMergeHead, &ids).value();
+    std::vector<OwnedHandle<git_commit>> commits;
+    commits.reserve(ids.size());
+    for (const git_oid &id : ids)
+    {
+        commits.push_back(acquire<git_commit>(git_commit_lookup, repository, &id).value());
+    }
+    return commits;
+}
+
+/// libgit2 1.5 answers with success, and has moved no branch, when it can't write the commit's
+/// object, on a full disk for example. All that tells then is that there is no such object, and the
+/// error record, which stands until the next call. Raises then, and keeps any other failure.
+GitResult<OwnedHandle<git_object>> lookUpWritten(git_repository *repository, const git_oid &id)
+{
+    const GitError failure(GIT_ERROR);
+    auto commit = acquire<git_object>(git_object_lookup, repository, &id, GIT_OBJECT_COMMIT);
+    if (commit.has_error() && commit.error().getCode() == GIT_ENOTFOUND)
+    {
+        GitErrorPolicy::throwIfError(failure);
+    }
+    return commit;
+}
+
+} // namespace
+
+void GitAdapter::commit(const upath & /*folder*/, const ustring &message)
+{
+    const OwnedHandle<git_repository> repository = openRepository(root_);
+    // From here on nobody else commits, merges or ends a merge in this working copy.
+    IndexLock lock(repository.get());
+    // Without a commit at HEAD, for whatever reason, the new commit is a root commit.
+    const GitResult<OwnedHandle<git_commit>> head = lookupCommitByName("HEAD", repository.get());
+    std::vector<OwnedHandle<git_commit>> mergeHeads;
+    std::vector<const git_commit *> parents;
+    const git_commit *const headCommit = head.has_value() ? head.value().get() : nullptr;
+    if (headCommit != nullptr)
+    {
+        parents.push_back(headCommit);
+    }
+    const int state = readRepositoryState(repository.get());
+    if (state == GIT_REPOSITORY_STATE_MERGE)
+    {
+        mergeHeads = lookupMergeHeads(repository.get());
+        for (const auto &mergeHead : mergeHeads)
+        {
+            parents.push_back(mergeHead.get());
+        }
+    }
+    if (expectedMerge_ != nullptr)
+    {
+        refuseOtherParents(*expectedMerge_, parents);
+    }
+    if (headCommit != nullptr && mergeHeads.size() == 1)
+    {
+        refuseInterruptedMerge(repository.get(), parents.front(), parents.back());
+    }
+    else if (state == GIT_REPOSITORY_STATE_NONE)
+    {
+        removeMergeMarker(repository.get());
+    }
+    createCommit(repository.get(), message, headCommit, parents, lock);
+    expectMerge(nullptr);
+}
+
+void GitAdapter::expectMerge(const MergeSides *sides) noexcept
+{
+    expectedMerge_ = sides;
+}
+
+void GitAdapter::refreshForCommit(git_repository *repository, git_index *index,
+                                  const git_commit *head,
+                                  const std::vector<const git_commit *> &parents) const
+{
+    const CommitSubmodules submodules(index, parents);
+    submodules.resolve(index);
+    if (expectedMerge_ != nullptr)
+    {
+        submodules.takeOut(index);
+    }
+    refreshIndex(repository, index);
+    // Where HEAD can't be read, nothing tells which commit the user has checked out on purpose.
+    const std::size_t ours = head != nullptr ? 1 : 0;
+    if (expectedMerge_ != nullptr || parents.size() > ours)
+    {
+        submodules.restore(index, expectedMerge_ != nullptr ? nullptr : head);
+    }
+}
+
+void GitAdapter::createCommit(git_repository *repository, const ustring &message,
+                              const git_commit *head,
+                              const std::vector<const git_commit *> &parents, IndexLock &lock)
+{
+    // First, so that a missing identity fails with nothing touched.
+    const OwnedHandle<git_signature> signature = makeSignature(repository);
+    const OwnedHandle<git_index> index = getRepositoryIndex(repository);
+    refreshForCommit(repository, index.get(), head, parents);
+    writeIndex(index.get());
+    // To libgit2 it ends at its first NUL.
+    const std::string text = fl::i18n::ustring_to_utf8(message);
+    const git_oid treeId = writeIndexTree(index.get());
+    const OwnedHandle<git_tree> tree = lookupTree(repository, &treeId);
+    // Before HEAD moves: an older index would undo the commit in the next one.
+    lock.publish();
+    git_oid id{};
+    // libgit2's parameter is not const throughout.
+    auto parentPointers = parents;
+    retryWhileLocked(repository,
+                     [&]
+                     {
+                         return call(git_commit_create, &id, repository, "HEAD", signature.get(),
+                                     signature.get(), "UTF-8", text.c_str(), tree.get(),
+                                     parentPointers.size(), parentPointers.data());
+                     })
+        .value();
+    const GitResult<OwnedHandle<git_object>> written = lookUpWritten(repository, id);
+    // The commit stands, even if its object can't be read just now.
+    cleanUpRepositoryState(repository);
+    written.value();
+}
+
+} // namespace vclink::git

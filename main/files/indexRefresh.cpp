@@ -1,0 +1,126 @@
+// SPDX-License-Identifier: MIT
+#include "main/files/indexRefresh.hpp"
+
+#include <cerrno>
+#include <cstddef>
+#include <string>
+
+#include <fcntl.h>
+#include <git2/errors.h>
+#include <git2/index.h>
+#include <git2/repository.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include "error/errorUtil/GitResult.hpp"
+#include "error/errorUtil/raiseSystemError.hpp"
+#include "util/repository/repository.hpp"
+
+namespace vclink::git
+{
+namespace
+{
+
+bool isIndexed(git_index *index, const char *path)
+{
+    std::size_t position = 0;
+    const GitResult<void> found = call(git_index_find, &position, index, path);
+    if (found.has_error() && found.error().getCode() == GIT_ENOTFOUND)
+    {
+        return false;
+    }
+    found.value();
+    return true;
+}
+
+/// Why a folder above the file can't be listed, so that the refresh misses what stands in it; 0
+/// when all can.
+int findHidingFolder(const std::string &workdir, const std::string &path)
+{
+    for (auto end = path.find('/'); end != std::string::npos; end = path.find('/', end + 1))
+    {
+        const std::string folder = workdir + path.substr(0, end);
+        if (faccessat(AT_FDCWD, folder.c_str(), R_OK, AT_EACCESS) != 0)
+        {
+            return errno;
+        }
+    }
+    return 0;
+}
+
+bool isBehindLink(const std::string &workdir, const std::string &path)
+{
+    for (auto end = path.find('/'); end != std::string::npos; end = path.find('/', end + 1))
+    {
+        struct stat status = {};
+        if (lstat((workdir + path.substr(0, end)).c_str(), &status) == 0 && S_ISLNK(status.st_mode))
+        {
+            return true;
+        }
+    }
+    return false;
+}
+
+/// Why the file can't be looked at, or could not a moment ago; 0 when it can, and also when it is
+/// gone.
+int findObstacle(const std::string &workdir, const std::string &path)
+{
+    struct stat status = {};
+    if (lstat((workdir + path).c_str(), &status) == 0)
+    {
+        const int error = findHidingFolder(workdir, path);
+        // Something else took its place, a folder perhaps, unless it only can't be seen. A file is
+        // no such thing: the refresh would have taken it as it stands.
+        const bool isMissed =
+            (S_ISREG(status.st_mode) || S_ISLNK(status.st_mode)) && !isBehindLink(workdir, path);
+        return error == 0 && isMissed ? EIO : error;
+    }
+    return errno == ENOENT || errno == ENOTDIR ? 0 : errno;
+}
+
+/// A file that can't be looked at is there for all one knows. git would fail on it too.
+void refuseUnreadable(const std::string &workdir, const std::string &path)
+{
+    const int error = findObstacle(workdir, path);
+    if (error != 0)
+    {
+        raiseSystemError(error, "could not read '" + path + "', which is tracked");
+    }
+}
+
+void restoreDropped(git_repository *repository, git_index *index, git_index *before)
+{
+    const std::string workdir = git_repository_workdir(repository);
+    const std::size_t count = git_index_entrycount(before);
+    for (std::size_t i = 0; i < count; ++i)
+    {
+        const git_index_entry *const entry = git_index_get_byindex(before, i);
+        if (isIndexed(index, entry->path))
+        {
+            continue;
+        }
+        if ((entry->flags_extended & GIT_INDEX_ENTRY_SKIP_WORKTREE) != 0)
+        {
+            call(git_index_add, index, entry).value();
+        }
+        else
+        {
+            refuseUnreadable(workdir, entry->path);
+        }
+    }
+}
+
+} // namespace
+
+void refreshIndex(git_repository *repository, git_index *index)
+{
+    const std::size_t countBefore = git_index_entrycount(index);
+    call(git_index_update_all, index, nullptr, nullptr, nullptr).value();
+    if (git_index_entrycount(index) < countBefore)
+    {
+        const OwnedHandle<git_index> before = openIndex(git_index_path(index));
+        restoreDropped(repository, index, before.get());
+    }
+}
+
+} // namespace vclink::git

@@ -1,0 +1,144 @@
+// SPDX-License-Identifier: MIT
+// GitAdapter::revertFiles: the index back to HEAD, then the files back to the index.
+#include <algorithm>
+#include <cstddef>
+#include <memory>
+#include <string>
+
+#include <git2/checkout.h>
+#include <git2/errors.h>
+#include <git2/index.h>
+#include <git2/reset.h>
+
+#include "error/errorUtil/GitResult.hpp"
+#include "error/raise.hpp"
+#include "fl/i18n/convert.hpp"
+#include "main/checkout/CheckoutWatch.hpp"
+#include "main/files/GitAdapter.hpp"
+#include "options/gitRecords.hpp"
+#include "util/lock/IndexLock.hpp"
+#include "util/path/PathspecArray.hpp"
+#include "util/repository/repository.hpp"
+#include "vclink/git/messageIdentifiers.hpp"
+#include "vclink/util/generateFileReport.hpp"
+
+namespace vclink::git
+{
+namespace
+{
+
+/// A key of the states without the root's text; empty when it does not lie below the root.
+std::string nameBelow(const std::string &root, const std::string &key)
+{
+    const bool isBelow = key.size() > root.size() && key.compare(0, root.size(), root) == 0 &&
+                         (root.empty() || root.back() == '/' || key[root.size()] == '/');
+    const auto begin = isBelow ? key.find_first_not_of('/', root.size()) : std::string::npos;
+    return begin == std::string::npos ? std::string() : key.substr(begin);
+}
+
+/// The names, relative to the root, of the changed files that HEAD holds.
+std::vector<std::string> changedNames(const FileStateMap &states, const upath &root)
+{
+    const std::string rootText = fl::i18n::ustring_to_utf8(root.string());
+    std::vector<std::string> names;
+    for (const auto &[path, state] : states)
+    {
+        const FileState::State number = state.getState();
+        if (number != FileState::Clean && number != FileState::Unversioned &&
+            number != FileState::Added)
+        {
+            names.push_back(nameBelow(rootText, fl::i18n::ustring_to_utf8(path.string())));
+        }
+    }
+    return names;
+}
+
+bool areIndexed(git_index *index, const std::vector<std::string> &names)
+{
+    return std::all_of(names.begin(), names.end(),
+                       [index](const std::string &name)
+                       { return git_index_get_bypath(index, name.c_str(), 0) != nullptr; });
+}
+
+/// A file that is put back takes what was staged below its name out of the index, if these entries
+/// are the index's first. libgit2 then fails to take them out once more, and gives up in the midst
+/// of the list: what is done by then need not be done again.
+bool isHalfDone(const GitResult<void> &reset)
+{
+    return reset.has_error() && reset.error().getCode() == GIT_ENOTFOUND &&
+           reset.error().getErrorClass() == GIT_ERROR_INDEX;
+}
+
+/// @param files how many may be put back at most
+void resetToHead(git_repository *repository, const git_object *head, const PathspecArray &pathspec,
+                 std::size_t files)
+{
+    GitResult<void> reset = call(git_reset_default, repository, head, getArrayPointer(pathspec));
+    for (; isHalfDone(reset) && files > 0; --files)
+    {
+        reset = call(git_reset_default, repository, head, getArrayPointer(pathspec));
+    }
+    reset.value();
+}
+
+void resetEntries(git_repository *repository, const git_object *head, const PathspecArray &pathspec,
+                  const std::vector<std::string> &names)
+{
+    // The one that the resets and the checkout work on. Left to them, it would be empty where
+    // libgit2 can't look at the file, and hold nothing but these entries afterwards.
+    const OwnedHandle<git_index> index = getRepositoryIndex(repository);
+    resetToHead(repository, head, pathspec, names.size());
+    // A file whose kind was changed in the index, to a link or from one, is taken out of it by the
+    // first reset, and put back by the second.
+    if (head != nullptr && !areIndexed(index.get(), names))
+    {
+        resetToHead(repository, head, pathspec, names.size());
+    }
+}
+
+} // namespace
+
+FileStateMap GitAdapter::throwIfConflicted(const std::vector<upath> &files)
+{
+    FileStateMap states = getFileStates(files);
+    std::vector<upath> conflicted;
+    for (const auto &[path, state] : states)
+    {
+        if (state.getState() == FileState::InConflict)
+        {
+            conflicted.push_back(path);
+        }
+    }
+    if (!conflicted.empty())
+    {
+        raise(shared_vclink::git::Conflicted(vclink::util::generateFileReport(conflicted)));
+    }
+    return states;
+}
+
+void GitAdapter::revertFiles(const std::vector<upath> &files)
+{
+    const FileStateMap states = throwIfConflicted(files);
+    if (files.empty())
+    {
+        return;
+    }
+    const PathspecArray pathspec = makeFilePathspec(files, root_);
+    const OwnedHandle<git_repository> repository = openRepository(root_);
+    IndexLock lock(repository.get());
+    // Without a HEAD the reset takes the paths out of the index.
+    const GitResult<OwnedHandle<git_object>> head = revparseObject(repository.get(), "HEAD");
+    const std::vector<std::string> names = changedNames(states, root_);
+    resetEntries(repository.get(), head.has_value() ? head.value().get() : nullptr, pathspec,
+                 names);
+    const std::shared_ptr<GitOptionsFactory> factory = optionsFactory_;
+    CheckoutOptions options = factory->makeCheckoutOptions();
+    options.checkoutStrategy = GIT_CHECKOUT_FORCE | GIT_CHECKOUT_RECREATE_MISSING;
+    git_checkout_options record = toGitCheckoutOptions(options, callbacks_->checkoutCallbacks());
+    record.paths = getArray(pathspec);
+    const CheckoutWatch watch(CheckoutKind::Revert, repository.get(), record);
+    call(git_checkout_index, repository.get(), nullptr, &record).value();
+    lock.publish();
+}
+
+} // namespace vclink::git

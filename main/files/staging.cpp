@@ -1,0 +1,116 @@
+// SPDX-License-Identifier: MIT
+// GitAdapter::addFiles, removeFiles and markResolved: changes of the index alone.
+#include <git2/index.h>
+
+#include "error/errorUtil/GitResult.hpp"
+#include "error/errorUtil/gitString.hpp"
+#include "error/raise.hpp"
+#include "fl/filesystem/operations.hpp"
+#include "main/files/GitAdapter.hpp"
+#include "util/lock/IndexLock.hpp"
+#include "util/path/PathspecArray.hpp"
+#include "util/repository/repository.hpp"
+#include "vclink/git/messageIdentifiers.hpp"
+#include "vclink/util/generateFileReport.hpp"
+
+namespace vclink::git
+{
+namespace
+{
+
+/// Lets libgit2 process every path that matches.
+int acceptAllPaths(const char * /*path*/, const char * /*matchedPathspec*/, void * /*adapter*/)
+{
+    return 0;
+}
+
+void refuseNuls(const std::vector<upath> &files)
+{
+    for (const upath &file : files)
+    {
+        static_cast<void>(toGitString(file.string()));
+    }
+}
+
+} // namespace
+
+void GitAdapter::addFiles(const std::vector<upath> &files)
+{
+    std::vector<upath> toAdd;
+    std::vector<upath> refused;
+    for (const auto &[path, state] : getFileStates(files))
+    {
+        (state.getState() == FileState::Unversioned ? toAdd : refused).push_back(path);
+    }
+    if (!refused.empty())
+    {
+        raise(shared_vclink::git::AlreadyAdded(vclink::util::generateFileReport(refused)));
+    }
+    addToIndex(toAdd);
+}
+
+void GitAdapter::removeFiles(const std::vector<upath> &files)
+{
+    std::vector<upath> toRemove;
+    for (const auto &[path, state] : getFileStates(files))
+    {
+        if (state.getState() != FileState::Deleted)
+        {
+            toRemove.push_back(path);
+        }
+    }
+    if (toRemove.empty())
+    {
+        raise(shared_vclink::git::NoFilesToRemove());
+    }
+    removeFromIndex(toRemove);
+}
+
+void GitAdapter::markResolved(const upath &file)
+{
+    if (fl::filesystem::exists(file))
+    {
+        addToIndex({file});
+    }
+    else
+    {
+        removeFromIndex({file});
+    }
+}
+
+void GitAdapter::addToIndex(const std::vector<upath> &files)
+{
+    if (files.empty())
+    {
+        return;
+    }
+    refuseNuls(files);
+    const OwnedHandle<git_repository> repository = openRepository(root_);
+    IndexLock lock(repository.get());
+    const OwnedHandle<git_index> index = getRepositoryIndex(repository.get());
+    const PathspecArray pathspec = makeFilePathspec(files, root_);
+    call(git_index_add_all, index.get(), getArrayPointer(pathspec), GIT_INDEX_ADD_DEFAULT,
+         acceptAllPaths, this)
+        .value();
+    writeIndex(index.get());
+    lock.publish();
+}
+
+void GitAdapter::removeFromIndex(const std::vector<upath> &files)
+{
+    if (files.empty())
+    {
+        return;
+    }
+    refuseNuls(files);
+    const OwnedHandle<git_repository> repository = openRepository(root_);
+    IndexLock lock(repository.get());
+    const OwnedHandle<git_index> index = getRepositoryIndex(repository.get());
+    const PathspecArray pathspec = makeFilePathspec(files, root_);
+    call(git_index_remove_all, index.get(), getArrayPointer(pathspec), acceptAllPaths, this)
+        .value();
+    writeIndex(index.get());
+    lock.publish();
+}
+
+} // namespace vclink::git

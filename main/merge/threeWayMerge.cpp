@@ -1,0 +1,179 @@
+// SPDX-License-Identifier: MIT
+// BranchMerger::threeWayMerge: git_merge, and what follows it with and without conflicts.
+#include <filesystem>
+#include <optional>
+#include <string>
+#include <system_error>
+
+#include <git2/annotated_commit.h>
+#include <git2/attr.h>
+#include <git2/checkout.h>
+#include <git2/errors.h>
+#include <git2/index.h>
+#include <git2/merge.h>
+#include <git2/refs.h>
+#include <git2/repository.h>
+
+#include "error/errorUtil/GitResult.hpp"
+#include "error/errorUtil/gitString.hpp"
+#include "error/logging/logger.hpp"
+#include "error/raise.hpp"
+#include "fl/i18n/convert.hpp"
+#include "main/checkout/CheckoutWatch.hpp"
+#include "main/merge/BranchMerger.hpp"
+#include "main/mergeState/MergeMarker.hpp"
+#include "main/mergeState/mergeHead.hpp"
+#include "options/gitRecords.hpp"
+#include "util/lock/IndexLock.hpp"
+#include "util/path/PathspecArray.hpp"
+#include "util/path/pathspecEscape.hpp"
+#include "util/repository/repository.hpp"
+#include "util/scope/ScopedCleanup.hpp"
+#include "vclink/git/messageIdentifiers.hpp"
+
+namespace vclink::git
+{
+namespace
+{
+
+/// What the working tree's attribute files, and then the index's, say of a file. A failure counts
+/// as no attribute.
+git_attr_value_t readAttribute(git_repository *repository, const char *path, const char *name)
+{
+    const char *value = nullptr;
+    static_cast<void>(git_attr_get(&value, repository, 0, path, name));
+    return git_attr_value(value);
+}
+
+bool isUnmergeable(git_repository *repository, const char *path)
+{
+    const git_attr_value_t merge = readAttribute(repository, path, "merge");
+    const git_attr_value_t text = readAttribute(repository, path, "text");
+    return merge == GIT_ATTR_VALUE_FALSE ||
+           (text == GIT_ATTR_VALUE_FALSE && merge == GIT_ATTR_VALUE_STRING);
+}
+
+/// libgit2 removes the folder of a submodule in conflict if it is empty, since the submodule is not
+/// populated. A commit would take the submodule for deleted.
+void bringFolderBack(git_repository *repository, const git_index_entry *ours)
+{
+    if (ours != nullptr && ours->mode == GIT_FILEMODE_COMMIT)
+    {
+        std::error_code stays;
+        std::filesystem::create_directories(
+            git_repository_workdir(repository) + std::string(ours->path), stays);
+    }
+}
+
+std::vector<ustring> listUnmergeable(git_repository *repository, git_index *index)
+{
+    const OwnedHandle<git_index_conflict_iterator> iterator =
+        acquire<git_index_conflict_iterator>(git_index_conflict_iterator_new, index).value();
+    std::vector<ustring> paths;
+    for (;;)
+    {
+        const git_index_entry *ancestor = nullptr;
+        const git_index_entry *ours = nullptr;
+        const git_index_entry *theirs = nullptr;
+        const GitResult<void> next =
+            call(git_index_conflict_next, &ancestor, &ours, &theirs, iterator.get());
+        if (next.has_error() && next.error().getCode() == GIT_ITEROVER)
+        {
+            return paths;
+        }
+        next.value();
+        collectUnmergeable(repository, paths, ancestor);
+        collectUnmergeable(repository, paths, ours);
+        collectUnmergeable(repository, paths, theirs);
+        bringFolderBack(repository, ours);
+    }
+}
+
+/// As patterns that match these names only.
+std::vector<ustring> makeExactPatterns(const std::vector<ustring> &paths)
+{
+    std::vector<ustring> patterns;
+    patterns.reserve(paths.size());
+    for (const ustring &path : paths)
+    {
+        const std::string name = fl::i18n::ustring_to_utf8(path);
+        patterns.push_back(fl::i18n::utf8_to_ustring(escapeExactPathspec(name)));
+    }
+    return patterns;
+}
+
+} // namespace
+
+void collectUnmergeable(git_repository *repository, std::vector<ustring> &paths,
+                        const git_index_entry *entry)
+{
+    if (entry == nullptr || entry->path == nullptr || !isUnmergeable(repository, entry->path))
+    {
+        return;
+    }
+    writeRecord(SeverityDiagnostic, "Conflicted entry is not mergeable: ", entry->path);
+    paths.push_back(fl::i18n::utf8_to_ustring(entry->path));
+}
+
+void BranchMerger::threeWayMerge(const BranchName &name, git_repository *repository,
+                                 git_annotated_commit *theirs)
+{
+    CheckoutOptions options = optionsFactory_->makeCheckoutOptions();
+    options.checkoutStrategy = GIT_CHECKOUT_FORCE | GIT_CHECKOUT_ALLOW_CONFLICTS;
+    const MergeOptions mergeOptions = optionsFactory_->makeMergeOptions();
+    git_checkout_options checkoutRecord =
+        toGitCheckoutOptions(options, callbacks_->checkoutCallbacks());
+    const git_merge_options mergeRecord = toGitMergeOptions(mergeOptions);
+    const git_annotated_commit *heads[] = {theirs};
+    // Outlasts the lock, so that it stands until the index is in place.
+    std::optional<MergeMarker> marker;
+    IndexLock lock(repository);
+    refuseOtherStates(repository);
+    CheckoutWatch watch(CheckoutKind::Merge, repository, checkoutRecord);
+    watch.lookBeforeMerge(git_annotated_commit_id(theirs));
+    const MergeSides sides{readHeadId(repository), *git_annotated_commit_id(theirs)};
+    marker.emplace(repository, sides);
+    call(git_merge, repository, heads, 1U, &mergeRecord, &checkoutRecord).value();
+    restoreMergeHead(repository, sides.theirs);
+    watch.settleSubmodules();
+    const OwnedHandle<git_index> index = getRepositoryIndex(repository);
+    if (git_index_has_conflicts(index.get()) != 0)
+    {
+        endWithConflicts(repository, index.get(), checkoutRecord, lock);
+    }
+    lock.publish();
+    marker.reset();
+    // The commit takes it again, for a repository of its own.
+    lock.release();
+    commitMerge(name, repository, sides);
+}
+
+void BranchMerger::commitMerge(const BranchName &name, git_repository *repository,
+                               const MergeSides &sides)
+{
+    const bool isReference =
+        acquire<git_reference>(git_reference_dwim, repository, asGitString(name)).has_value();
+    const std::string message = (isReference ? "Merge branch '" : "Merge commit '") + name + "'";
+    adapter_.expectMerge(&sides);
+    const ScopedCleanup over([this] { adapter_.expectMerge(nullptr); });
+    vclink::CMAdapter &adapter = adapter_;
+    adapter.commit(upath(), fl::i18n::utf8_to_ustring(message));
+}
+
+void BranchMerger::endWithConflicts(git_repository *repository, git_index *index,
+                                    const git_checkout_options &options, IndexLock &lock)
+{
+    const std::vector<ustring> paths = listUnmergeable(repository, index);
+    if (!paths.empty())
+    {
+        git_checkout_options copy = options;
+        const PathspecArray pathspec = makeStringPathspec(makeExactPatterns(paths));
+        copy.paths = getArray(pathspec);
+        copy.checkout_strategy |= GIT_CHECKOUT_USE_OURS;
+        call(git_checkout_index, repository, nullptr, &copy).value();
+    }
+    lock.publish();
+    raise(shared_vclink::git::HasConflicts());
+}
+
+} // namespace vclink::git

@@ -1,0 +1,97 @@
+// SPDX-License-Identifier: MIT
+#include "main/mergeState/MergeMarker.hpp"
+
+#include <array>
+#include <cerrno>
+#include <cstddef>
+
+#include <fcntl.h>
+#include <git2/oid.h>
+#include <git2/repository.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include "error/errorUtil/raiseSystemError.hpp"
+#include "util/scope/FileDescriptor.hpp"
+
+namespace vclink::git
+{
+namespace
+{
+
+constexpr std::size_t idLineSize = GIT_OID_HEXSZ + 1;
+constexpr std::size_t markerSize = 2 * idLineSize;
+
+std::string markerPath(git_repository *repository)
+{
+    return git_repository_path(repository) + std::string("vclink-merge");
+}
+
+std::string lineOf(const git_oid &id)
+{
+    std::string line(idLineSize, '\n');
+    git_oid_fmt(line.data(), &id);
+    return line;
+}
+
+void writeMarker(const std::string &path, const std::string &text)
+{
+    const FileDescriptor file(::open(path.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC,
+                                     S_IRUSR | S_IWUSR | S_IRGRP | S_IROTH));
+    if (!file || ::write(file.get(), text.data(), text.size()) != static_cast<ssize_t>(text.size()))
+    {
+        const int error = errno;
+        ::unlink(path.c_str());
+        raiseSystemError(error, "could not write '" + path + "'");
+    }
+}
+
+} // namespace
+
+MergeMarker::MergeMarker(git_repository *repository, const MergeSides &sides)
+    : path_(markerPath(repository))
+{
+    removeMergeMarker(repository);
+    // git's own sign of a merge that is whole. libgit2 leaves it when it ends one.
+    const std::string autoMerge = git_repository_path(repository) + std::string("AUTO_MERGE");
+    ::unlink(autoMerge.c_str());
+    writeMarker(path_, lineOf(sides.ours) + lineOf(sides.theirs));
+}
+
+MergeMarker::~MergeMarker()
+{
+    ::unlink(path_.c_str());
+}
+
+bool hasMergeMarker(git_repository *repository, const git_oid &theirs)
+{
+    const std::string path = markerPath(repository);
+    const FileDescriptor file(::open(path.c_str(), O_RDONLY | O_CLOEXEC));
+    if (!file && errno == ENOENT)
+    {
+        return false;
+    }
+    std::array<char, markerSize> text{};
+    const ssize_t size = file ? ::read(file.get(), text.data(), text.size()) : -1;
+    if (size < 0)
+    {
+        raiseSystemError(errno, "could not read '" + path + "'");
+    }
+    const bool isWhole = static_cast<std::size_t>(size) == text.size();
+    const std::string marker(text.data(), text.size());
+    return !isWhole || marker.substr(marker.size() / 2) == lineOf(theirs);
+}
+
+void removeMergeMarker(git_repository *repository) noexcept
+{
+    // An allocation that fails leaves it for the next time.
+    try
+    {
+        ::unlink(markerPath(repository).c_str());
+    }
+    catch (...)
+    {
+    }
+}
+
+} // namespace vclink::git

@@ -1,0 +1,214 @@
+// SPDX-License-Identifier: MIT
+#include "main/mergeState/interruptedMerge.hpp"
+
+#include <array>
+#include <cerrno>
+#include <cstddef>
+#include <memory>
+#include <string>
+
+#include <fcntl.h>
+#include <git2/commit.h>
+#include <git2/diff.h>
+#include <git2/errors.h>
+#include <git2/index.h>
+#include <git2/merge.h>
+#include <git2/oid.h>
+#include <git2/repository.h>
+#include <git2/tree.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include "error/errorUtil/GitResult.hpp"
+#include "error/errorUtil/callbackException.hpp"
+#include "error/errorUtil/raiseGitError.hpp"
+#include "error/errorUtil/raiseSystemError.hpp"
+#include "main/mergeState/MergeMarker.hpp"
+#include "util/repository/objectIds.hpp"
+#include "util/repository/repository.hpp"
+#include "util/scope/FileDescriptor.hpp"
+
+namespace vclink::git
+{
+namespace
+{
+
+/// Stages whatever stands where the merge may have written, so that new files are told from
+/// untracked ones, keeps it in the stash if it is anything, and puts back what HEAD has. Everything
+/// else stays. Folders, in the places of files that are not written yet, would stop the staging.
+constexpr const char *wayOut =
+    "To begin again, run in the root of the working copy: git diff-tree -r -z --name-only HEAD "
+    "MERGE_HEAD | xargs -0 sh -c 'for f; do [ -d \"$f\" ] && [ ! -L \"$f\" ] || "
+    "printf \"%s\\0\" \"$f\"; done' sh | git update-index -z --add --remove --replace --stdin; "
+    "git stash create | xargs -r git stash store; git merge --abort";
+
+/// @throws LibGit2Exception if that can't be looked at
+bool exists(const std::string &path)
+{
+    struct stat status = {};
+    const bool isThere = ::lstat(path.c_str(), &status) == 0;
+    if (!isThere && errno != ENOENT)
+    {
+        raiseSystemError(errno, "could not read '" + path + "'");
+    }
+    return isThere;
+}
+
+/// What libgit2 writes for every merge, and git only where asked for a merge commit.
+bool isModeOfLibGit2(const std::string &path)
+{
+    const std::string expected = "no-ff";
+    std::array<char, 16> text{};
+    const FileDescriptor file(::open(path.c_str(), O_RDONLY | O_CLOEXEC));
+    if (!file && errno == ENOENT)
+    {
+        return false;
+    }
+    if (!file || ::read(file.get(), text.data(), text.size() - 1) < 0)
+    {
+        raiseSystemError(errno, "could not read '" + path + "'");
+    }
+    return text.data() == expected;
+}
+
+OwnedHandle<git_tree> treeOf(const git_commit *commit)
+{
+    return acquire<git_tree>(git_commit_tree, commit).value();
+}
+
+/// The tree that both sides began with; null if they have nothing in common.
+OwnedHandle<git_tree> findBase(git_repository *repository, const git_commit *ours,
+                               const git_commit *theirs)
+{
+    git_oid id{};
+    const GitResult<void> found =
+        call(git_merge_base, &id, repository, git_commit_id(ours), git_commit_id(theirs));
+    if (found.has_error() && found.error().getCode() == GIT_ENOTFOUND)
+    {
+        return nullptr;
+    }
+    found.value();
+    return treeOf(acquire<git_commit>(git_commit_lookup, repository, &id).value().get());
+}
+
+/// A file of a tree or an index; the mode is 0 if it is not there.
+struct File
+{
+    git_oid id = {};
+    unsigned mode = 0;
+
+    bool operator==(const File &other) const
+    {
+        return mode == other.mode && (mode == 0 || isSameId(id, other.id));
+    }
+};
+
+File findInTree(const git_tree *tree, const char *path)
+{
+    git_tree_entry *raw = nullptr;
+    const GitResult<void> found = call(git_tree_entry_bypath, &raw, tree, path);
+    const std::unique_ptr<git_tree_entry, void (*)(git_tree_entry *)> entry(raw,
+                                                                            git_tree_entry_free);
+    if (found.has_error() && found.error().getCode() == GIT_ENOTFOUND)
+    {
+        return {};
+    }
+    found.value();
+    return {*git_tree_entry_id(raw), git_tree_entry_filemode(raw)};
+}
+
+File findInIndex(git_index *index, const char *path)
+{
+    const git_index_entry *const entry = git_index_get_bypath(index, path, 0);
+    return entry == nullptr ? File{} : File{entry->id, entry->mode};
+}
+
+/// Looks at what theirs has changed for something that ours has not touched.
+struct Search
+{
+    const git_tree *ours;
+    git_index *index;
+    bool isOneSided = false;
+    bool isTaken = false;
+};
+
+/// Keeps no delta, and ends the comparison once there is nothing more to learn.
+int lookAt(const git_diff * /*diff*/, const git_diff_delta *delta, const char * /*pathspec*/,
+           void *payload) noexcept
+{
+    constexpr int skip = 1;
+    try
+    {
+        auto &search = *static_cast<Search *>(payload);
+        const char *const path = delta->new_file.path;
+        const File before{delta->old_file.id, delta->old_file.mode};
+        const File ours = findInTree(search.ours, path);
+        if (before == ours)
+        {
+            search.isOneSided = true;
+            search.isTaken = !(findInIndex(search.index, path) == ours);
+        }
+        return search.isTaken ? GIT_EUSER : skip;
+    }
+    catch (...)
+    {
+        return parkCallbackException();
+    }
+}
+
+/// Whether only theirs has changed some files, and the index has none of it.
+bool isNothingTaken(git_repository *repository, const git_commit *ours, const git_commit *theirs)
+{
+    const OwnedHandle<git_tree> base = findBase(repository, ours, theirs);
+    const OwnedHandle<git_tree> oursTree = treeOf(ours);
+    const OwnedHandle<git_tree> theirsTree = treeOf(theirs);
+    const OwnedHandle<git_index> index = getRepositoryIndex(repository);
+    Search search{oursTree.get(), index.get()};
+    git_diff_options options{};
+    call(git_diff_options_init, &options, unsigned{GIT_DIFF_OPTIONS_VERSION}).value();
+    options.notify_cb = lookAt;
+    options.payload = &search;
+    git_diff *raw = nullptr;
+    const GitResult<void> compared =
+        call(git_diff_tree_to_tree, &raw, repository, base.get(), theirsTree.get(), &options);
+    const std::unique_ptr<git_diff, void (*)(git_diff *)> diff(raw, git_diff_free);
+    if (search.isTaken)
+    {
+        return false;
+    }
+    compared.value();
+    return search.isOneSided;
+}
+
+} // namespace
+
+void refuseInterruptedMerge(git_repository *repository, const git_commit *ours,
+                            const git_commit *theirs)
+{
+    const std::string folder = git_repository_path(repository);
+    const bool isSame = isSameId(*git_commit_tree_id(ours), *git_commit_tree_id(theirs));
+    if (isSame || exists(folder + "AUTO_MERGE"))
+    {
+        return;
+    }
+    const std::string name = git_oid_tostr_s(git_commit_id(theirs));
+    if (hasMergeMarker(repository, *git_commit_id(theirs)))
+    {
+        raiseGitError(GIT_ERROR, GIT_ERROR_MERGE,
+                      "the merge of " + name +
+                          " was interrupted before all of it was written, and a commit would "
+                          "leave the rest out. " +
+                          wayOut);
+    }
+    if (isModeOfLibGit2(folder + "MERGE_MODE") && isNothingTaken(repository, ours, theirs))
+    {
+        raiseGitError(GIT_ERROR, GIT_ERROR_MERGE,
+                      "nothing of what only " + name +
+                          " has changed is in the index, because its merge was interrupted or "
+                          "was put back, and a commit would record it as merged. If that is "
+                          "meant, run: git commit. " +
+                          wayOut);
+    }
+}
+
+} // namespace vclink::git

@@ -1,0 +1,289 @@
+// SPDX-License-Identifier: MIT
+#include <array>
+#include <csignal>
+#include <cstdlib>
+#include <future>
+#include <optional>
+#include <thread>
+#include <vector>
+
+#include <fcntl.h>
+#include <gtest/gtest.h>
+#include <poll.h>
+#include <sys/wait.h>
+#include <unistd.h>
+
+#include "support/DescriptorLimit.hpp"
+#include "support/NothingLeft.hpp"
+#include "util/command/FailedStartCleanup.hpp"
+
+namespace
+{
+
+using vclink::git::StartGuard;
+using vclink::test::DescriptorLimit;
+using vclink::test::hasChildren;
+
+/// The two ends of a pipe, closed at the end unless they are closed already.
+class StartGuardTest : public testing::Test
+{
+  protected:
+    StartGuardTest()
+    {
+        EXPECT_EQ(::pipe2(ends_.data(), O_CLOEXEC), 0);
+    }
+    ~StartGuardTest() override
+    {
+        for (const int end : ends_)
+        {
+            if (isOpen(end))
+                ::close(end);
+        }
+        EXPECT_FALSE(hasChildren());
+    }
+    static bool isOpen(int descriptor)
+    {
+        return ::fcntl(descriptor, F_GETFD) >= 0;
+    }
+    int source() const
+    {
+        return ends_[0];
+    }
+    int sink() const
+    {
+        return ends_[1];
+    }
+    /// A child that ends at once.
+    static pid_t makeChild(int status)
+    {
+        const pid_t child = ::fork();
+        if (child == 0)
+            ::_exit(status);
+        return child;
+    }
+    /// Waits until a child has ended, and leaves it.
+    static void awaitEnd(pid_t child)
+    {
+        siginfo_t info = {};
+        EXPECT_EQ(::waitid(P_PID, static_cast<id_t>(child), &info, WEXITED | WNOWAIT), 0);
+    }
+
+  private:
+    std::array<int, 2> ends_{-1, -1};
+};
+
+TEST_F(StartGuardTest, ClosesTheWritingEndWhenNothingHasStarted)
+{
+    {
+        const StartGuard guard(source(), sink());
+        EXPECT_TRUE(isOpen(sink()));
+    }
+    EXPECT_FALSE(isOpen(sink()));
+    EXPECT_TRUE(isOpen(source()));
+}
+
+TEST_F(StartGuardTest, LeavesANumberThatIsAnotherFilesByThen)
+{
+    {
+        const StartGuard guard(source(), sink());
+        ::close(sink());
+        const int other = ::open("/dev/null", O_RDONLY | O_CLOEXEC);
+        EXPECT_EQ(other, sink());
+    }
+    EXPECT_TRUE(isOpen(sink()));
+}
+
+TEST_F(StartGuardTest, LeavesANumberThatIsAnotherPipesByThen)
+{
+    std::array<int, 2> other{-1, -1};
+    {
+        const StartGuard guard(source(), sink());
+        ::close(sink());
+        EXPECT_EQ(::pipe2(other.data(), O_CLOEXEC), 0);
+        EXPECT_EQ(other[0], sink());
+    }
+    EXPECT_TRUE(isOpen(other[0]));
+    EXPECT_TRUE(isOpen(other[1]));
+    ::close(other[1]);
+}
+
+TEST_F(StartGuardTest, LeavesAnEndThatIsClosedAlready)
+{
+    {
+        const StartGuard guard(source(), sink());
+        ::close(sink());
+    }
+    EXPECT_FALSE(isOpen(sink()));
+    EXPECT_TRUE(isOpen(source()));
+}
+
+TEST_F(StartGuardTest, WaitsForTheChildThatCouldNotBecomeTheCommand)
+{
+    {
+        const StartGuard guard(source(), sink());
+        makeChild(EXIT_FAILURE);
+        EXPECT_TRUE(hasChildren());
+    }
+    EXPECT_FALSE(hasChildren());
+}
+
+TEST_F(StartGuardTest, LeavesTheChildrenThatWereThereBefore)
+{
+    const pid_t earlier = makeChild(EXIT_FAILURE);
+    awaitEnd(earlier);
+    {
+        const StartGuard guard(source(), sink());
+        makeChild(EXIT_FAILURE);
+    }
+    int status = 0;
+    EXPECT_EQ(::waitpid(earlier, &status, WNOHANG), earlier);
+    EXPECT_EQ(WEXITSTATUS(status), EXIT_FAILURE);
+}
+
+TEST_F(StartGuardTest, LeavesChildrenThatCouldNotBeListedBefore)
+{
+    const pid_t earlier = makeChild(EXIT_FAILURE);
+    awaitEnd(earlier);
+    const int reading = source();
+    const int writing = sink();
+    {
+        std::optional<DescriptorLimit> none(0);
+        const StartGuard guard(reading, writing);
+        none.reset();
+    }
+    EXPECT_EQ(::waitpid(earlier, nullptr, WNOHANG), earlier);
+}
+
+TEST_F(StartGuardTest, LeavesChildrenThatCannotBeListedAfterwards)
+{
+    pid_t child = 0;
+    std::optional<DescriptorLimit> none;
+    {
+        const StartGuard guard(source(), sink());
+        child = makeChild(EXIT_FAILURE);
+        none.emplace(0);
+    }
+    none.reset();
+    EXPECT_EQ(::waitpid(child, nullptr, 0), child);
+}
+
+TEST_F(StartGuardTest, WaitsForAChildThatTakesItsTimeToEnd)
+{
+    {
+        const StartGuard guard(source(), sink());
+        const pid_t child = ::fork();
+        if (child == 0)
+        {
+            ::poll(nullptr, 0, 20);
+            ::_exit(EXIT_FAILURE);
+        }
+    }
+    EXPECT_FALSE(hasChildren());
+}
+
+TEST_F(StartGuardTest, ListsAnyNumberOfChildren)
+{
+    std::vector<pid_t> earlier;
+    // Their list is longer than one reading of it.
+    for (int i = 0; i < 100; ++i)
+    {
+        earlier.push_back(makeChild(EXIT_FAILURE));
+        awaitEnd(earlier.back());
+    }
+    pid_t last = 0;
+    {
+        const StartGuard guard(source(), sink());
+        last = makeChild(EXIT_FAILURE);
+    }
+    EXPECT_EQ(::waitpid(last, nullptr, WNOHANG), -1);
+    for (const pid_t child : earlier)
+        EXPECT_EQ(::waitpid(child, nullptr, WNOHANG), child);
+}
+
+TEST_F(StartGuardTest, LeavesAChildThatEndsInAnotherWay)
+{
+    pid_t other = 0;
+    {
+        const StartGuard guard(source(), sink());
+        other = makeChild(0);
+    }
+    EXPECT_EQ(::waitpid(other, nullptr, 0), other);
+}
+
+TEST_F(StartGuardTest, LeavesTheChildrenOfOtherThreads)
+{
+    std::promise<pid_t> made;
+    std::promise<void> done;
+    std::thread other;
+    pid_t foreign = 0;
+    {
+        const StartGuard guard(source(), sink());
+        // A thread that goes on living keeps its children.
+        other = std::thread(
+            [&made, &done]
+            {
+                const pid_t child = makeChild(EXIT_FAILURE);
+                awaitEnd(child);
+                made.set_value(child);
+                done.get_future().wait();
+            });
+        foreign = made.get_future().get();
+        makeChild(EXIT_FAILURE);
+    }
+    EXPECT_EQ(::waitpid(foreign, nullptr, WNOHANG), foreign);
+    EXPECT_FALSE(hasChildren());
+    done.set_value();
+    other.join();
+}
+
+TEST_F(StartGuardTest, LeavesChildrenThatItCannotTellFromOneAnother)
+{
+    std::array<pid_t, 2> children{};
+    {
+        const StartGuard guard(source(), sink());
+        for (pid_t &child : children)
+            child = makeChild(EXIT_FAILURE);
+    }
+    for (const pid_t child : children)
+        EXPECT_EQ(::waitpid(child, nullptr, 0), child);
+}
+
+TEST_F(StartGuardTest, WaitsForAStartedChildThatWasKilled)
+{
+    {
+        StartGuard guard(source(), sink());
+        const pid_t child = ::fork();
+        if (child == 0)
+        {
+            for (;;)
+                ::pause();
+        }
+        guard.hasStarted(child);
+        ::kill(child, SIGKILL);
+    }
+    EXPECT_FALSE(hasChildren());
+    EXPECT_TRUE(isOpen(sink()));
+}
+
+TEST_F(StartGuardTest, LeavesEverythingWhenTheCommandHasEnded)
+{
+    pid_t child = 0;
+    {
+        StartGuard guard(source(), sink());
+        child = makeChild(EXIT_FAILURE);
+        guard.hasStarted(child);
+        guard.hasEnded();
+    }
+    EXPECT_TRUE(isOpen(sink()));
+    EXPECT_EQ(::waitpid(child, nullptr, 0), child);
+}
+
+TEST_F(StartGuardTest, IsContentWhenTheStatusOfTheChildIsGone)
+{
+    StartGuard guard(source(), sink());
+    const pid_t child = makeChild(0);
+    guard.hasStarted(child);
+    EXPECT_EQ(::waitpid(child, nullptr, 0), child);
+}
+
+} // namespace

@@ -1,0 +1,162 @@
+// SPDX-License-Identifier: MIT
+#include "util/command/FailedStartCleanup.hpp"
+
+#include <algorithm>
+#include <array>
+#include <cerrno>
+#include <csignal>
+#include <cstdlib>
+#include <iterator>
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include <fcntl.h>
+#include <poll.h>
+#include <sys/stat.h>
+#include <sys/wait.h>
+#include <unistd.h>
+
+#include "util/scope/ScopedCleanup.hpp"
+
+namespace vclink::git
+{
+namespace
+{
+
+/// Reads to a file's end.
+/// @return whether it could be
+bool readAll(int descriptor, std::string &bytes)
+{
+    std::array<char, 256> part{};
+    ssize_t size = 0;
+    while ((size = ::read(descriptor, part.data(), part.size())) != 0)
+    {
+        if (size > 0)
+        {
+            bytes.append(part.data(), static_cast<std::size_t>(size));
+        }
+        else if (errno != EINTR)
+        {
+            return false;
+        }
+    }
+    return true;
+}
+
+std::set<pid_t> parseProcesses(const std::string &text)
+{
+    std::set<pid_t> processes;
+    const char *next = text.c_str();
+    char *end = nullptr;
+    for (long number = std::strtol(next, &end, 10); end != next;
+         number = std::strtol(next, &end, 10))
+    {
+        processes.insert(static_cast<pid_t>(number));
+        next = end;
+    }
+    return processes;
+}
+
+/// The children that the calling thread has made and that were not waited for; nothing where they
+/// can't be known, as when no descriptor is left to read their list with.
+std::optional<std::set<pid_t>> readChildren()
+{
+    const int descriptor = ::open("/proc/thread-self/children", O_RDONLY | O_CLOEXEC);
+    if (descriptor < 0)
+    {
+        return std::nullopt;
+    }
+    const ScopedCleanup closing([descriptor] { ::close(descriptor); });
+    std::string list;
+    if (!readAll(descriptor, list))
+    {
+        return std::nullopt;
+    }
+    return parseProcesses(list);
+}
+
+bool referToSameFile(int left, int right) noexcept
+{
+    struct stat one = {};
+    struct stat other = {};
+    return ::fstat(left, &one) == 0 && ::fstat(right, &other) == 0 && one.st_dev == other.st_dev &&
+           one.st_ino == other.st_ino;
+}
+
+void reap(pid_t child) noexcept
+{
+    while (::waitpid(child, nullptr, 0) < 0 && errno == EINTR)
+    {
+    }
+}
+
+/// Whether a child that is about to end, within a second at most, does so as one does that could
+/// not become the command. The child stays.
+bool hasFailedToStart(pid_t child) noexcept
+{
+    constexpr int timeLimit = 1000;
+    siginfo_t info = {};
+    for (int time = 0; time <= timeLimit; ++time)
+    {
+        const int code =
+            ::waitid(P_PID, static_cast<id_t>(child), &info, WEXITED | WNOWAIT | WNOHANG);
+        if (code != 0 || info.si_pid == child)
+        {
+            break;
+        }
+        ::poll(nullptr, 0, 1);
+    }
+    return info.si_pid == child && info.si_code == CLD_EXITED && info.si_status == EXIT_FAILURE;
+}
+
+} // namespace
+
+StartGuard::StartGuard(int source, int sink)
+    : source_(source), sink_(sink), childrenBefore_(readChildren())
+{
+}
+
+StartGuard::~StartGuard()
+{
+    if (ended_)
+    {
+        return;
+    }
+    if (child_ != 0)
+    {
+        reap(child_);
+        return;
+    }
+    closeSink();
+    const ScopedCleanup reaping([this] { reapFailedChild(); });
+}
+
+void StartGuard::closeSink() const noexcept
+{
+    // Some releases close it themselves; the number may be another file's by then.
+    if (referToSameFile(source_, sink_))
+    {
+        ::close(sink_);
+    }
+}
+
+void StartGuard::reapFailedChild() const
+{
+    const std::optional<std::set<pid_t>> children = readChildren();
+    if (!childrenBefore_ || !children)
+    {
+        return;
+    }
+    std::vector<pid_t> added;
+    std::set_difference(children->begin(), children->end(), childrenBefore_->begin(),
+                        childrenBefore_->end(), std::back_inserter(added));
+    // With more than one, a thread has ended and left its children to this one: they are somebody
+    // else's, and a failed child that stays is the smaller evil.
+    if (added.size() == 1 && hasFailedToStart(added.front()))
+    {
+        reap(added.front());
+    }
+}
+
+} // namespace vclink::git

@@ -1,0 +1,159 @@
+// SPDX-License-Identifier: MIT
+#include "util/command/runCommand.hpp"
+
+#include <array>
+#include <cerrno>
+#include <sstream>
+#include <system_error>
+
+#include <fcntl.h>
+#include <unistd.h>
+
+// From Boost 1.86 on version 1 of Boost.Process stands in a folder of its own, and from 1.88 on
+// boost::process means version 2 unless told otherwise.
+#if __has_include(<boost/process/v1/child.hpp>)
+#define BOOST_PROCESS_VERSION 1
+#include <boost/process/v1/child.hpp>
+#include <boost/process/v1/env.hpp>
+#include <boost/process/v1/exception.hpp>
+#include <boost/process/v1/io.hpp>
+#include <boost/process/v1/pipe.hpp>
+#else
+#include <boost/process/child.hpp>
+#include <boost/process/env.hpp>
+#include <boost/process/exception.hpp>
+#include <boost/process/io.hpp>
+#include <boost/process/pipe.hpp>
+#endif
+
+#include "error/logging/logger.hpp"
+#include "util/command/ChildStatus.hpp"
+#include "util/command/FailedStartCleanup.hpp"
+#include "util/command/commandLine.hpp"
+#include "util/command/programLookup.hpp"
+
+namespace vclink::git
+{
+namespace
+{
+
+namespace process = boost::process;
+
+void raiseIfError(const std::error_code &error, const char *text)
+{
+    if (error)
+    {
+        throw process::process_error(error, text);
+    }
+}
+
+std::error_code lastError()
+{
+    return std::error_code(errno, std::system_category());
+}
+
+/// Moves a descriptor off the numbers of the standard streams, which a host may have closed: the
+/// child's own streams would come in its way there.
+int moveOffStandardStreams(int descriptor)
+{
+    if (descriptor < 0 || descriptor > STDERR_FILENO)
+    {
+        return descriptor;
+    }
+    const int moved = ::fcntl(descriptor, F_DUPFD_CLOEXEC, STDERR_FILENO + 1);
+    const std::error_code error = lastError();
+    ::close(descriptor);
+    raiseIfError(moved < 0 ? error : std::error_code(), "fcntl(2) failed");
+    return moved;
+}
+
+/// A pipe that no other command inherits: one that another thread starts meanwhile would hold this
+/// one's output open.
+process::pipe makePipe()
+{
+    std::array<int, 2> ends{};
+    if (::pipe2(ends.data(), O_CLOEXEC) != 0)
+    {
+        raiseIfError(lastError(), "pipe2(2) failed");
+    }
+    process::pipe pipe(ends[0], ends[1]);
+    pipe.assign_source(-1);
+    pipe.assign_source(moveOffStandardStreams(ends[0]));
+    pipe.assign_sink(-1);
+    pipe.assign_sink(moveOffStandardStreams(ends[1]));
+    return pipe;
+}
+
+/// What to hand to Boost.Process for a command.
+std::string makeUsable(const std::string &command)
+{
+    const char *const fault = findCommandFault(command);
+    if (fault != nullptr)
+    {
+        raiseIfError(std::make_error_code(std::errc::invalid_argument), fault);
+    }
+    if (!isChildStatusKept())
+    {
+        raiseIfError(std::error_code(ECHILD, std::system_category()),
+                     "the process ignores SIGCHLD, so that no exit status can be known");
+    }
+    std::error_code error;
+    std::string named = nameProgram(command, error);
+    // In the words in which Boost.Process tells of a program that can't be executed.
+    raiseIfError(error, "execve failed");
+    return named;
+}
+
+bool isRunning(ChildStatus &status)
+{
+    std::error_code error;
+    const bool running = status.isRunning(error);
+    raiseIfError(error, "the command's exit status can't be known");
+    return running;
+}
+
+int waitFor(ChildStatus &status)
+{
+    std::error_code error;
+    const int result = status.wait(error);
+    raiseIfError(error, "the command's exit status can't be known");
+    return result;
+}
+
+std::string readOutput(process::ipstream &output, ChildStatus &status)
+{
+    std::ostringstream collected;
+    for (std::string line; isRunning(status) && std::getline(output, line) && !line.empty();)
+    {
+        collected << line;
+    }
+    return collected.str();
+}
+
+} // namespace
+
+int runCommand(const std::string &commandTemplate,
+               const std::map<std::string, std::string> &placeholders)
+{
+    const std::string command = expandPlaceholders(commandTemplate, placeholders);
+    process::ipstream output(makePipe());
+    writeRecord(SeverityDiagnostic, "Command: ", command);
+    const std::string usable = makeUsable(command);
+    StartGuard guard(output.pipe().native_source(), output.pipe().native_sink());
+    process::child child(usable, process::std_out > output, process::std_err > process::null,
+                         boost::this_process::environment());
+    // Where the process can't be forked, Boost.Process raises nothing and gives no child, whose
+    // number would mean every child of the process.
+    raiseIfError(child.valid() ? std::error_code() : lastError(), "fork(2) failed");
+    guard.hasStarted(child.id());
+    ChildStatus status(child.id());
+    writeRecord(SeverityDiagnostic, "Output:\n", readOutput(output, status));
+    const int result = waitFor(status);
+    // Another waiter in the process may have been faster; the status is known.
+    std::error_code ignored;
+    child.wait(ignored);
+    guard.hasEnded();
+    return result;
+}
+
+} // namespace vclink::git

@@ -1,0 +1,142 @@
+// SPDX-License-Identifier: MIT
+#include "util/lock/IndexCopy.hpp"
+
+#include <algorithm>
+#include <array>
+#include <cerrno>
+#include <cstddef>
+#include <ctime>
+#include <utility>
+
+#include <fcntl.h>
+
+#include "error/errorUtil/raiseSystemError.hpp"
+
+namespace vclink::git
+{
+namespace
+{
+
+constexpr std::size_t blockSize = std::size_t{128} * 1024;
+
+[[noreturn]] void raiseUnreadable(int error, const std::string &index)
+{
+    raiseSystemError(error, "failed to read index: '" + index + "'", GIT_ERROR_INDEX);
+}
+
+[[noreturn]] void raiseUncopied(int error, const std::string &copy)
+{
+    raiseSystemError(error, "could not copy the index to '" + copy + "'");
+}
+
+void removeIfThere(const std::string &path)
+{
+    if (::unlink(path.c_str()) != 0 && errno != ENOENT)
+    {
+        raiseSystemError(errno, "could not remove '" + path + "'");
+    }
+}
+
+/// @return the errno, or 0
+int writeAll(const FileDescriptor &file, const char *data, std::size_t size) noexcept
+{
+    while (size > 0)
+    {
+        const ssize_t written = ::write(file.get(), data, size);
+        if (written < 0 && errno != EINTR)
+        {
+            return errno;
+        }
+        const std::size_t count = written < 0 ? 0 : static_cast<std::size_t>(written);
+        data += count;
+        size -= count;
+    }
+    return 0;
+}
+
+} // namespace
+
+IndexCopy::IndexCopy(std::string index, std::string path)
+    : index_(std::move(index)), path_(std::move(path))
+{
+}
+
+IndexCopy::IndexCopy(const std::string &index) : IndexCopy(index, index + ".vclink")
+{
+    removeIfThere(path_);
+    // The lock that libgit2 takes to write the copy.
+    removeIfThere(path_ + ".lock");
+    const FileDescriptor source(::open(index_.c_str(), O_RDONLY | O_CLOEXEC));
+    if (source)
+    {
+        copyFrom(source);
+    }
+    else if (errno != ENOENT)
+    {
+        raiseUnreadable(errno, index_);
+    }
+}
+
+IndexCopy::~IndexCopy()
+{
+    ::unlink(path_.c_str());
+}
+
+void IndexCopy::copyFrom(const FileDescriptor &source)
+{
+    struct stat status = {};
+    if (::fstat(source.get(), &status) != 0)
+    {
+        raiseUnreadable(errno, index_);
+    }
+    copy_ = FileDescriptor(
+        ::open(path_.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, S_IRUSR | S_IWUSR));
+    if (!copy_)
+    {
+        raiseUncopied(errno, path_);
+    }
+    copyContent(source, static_cast<std::size_t>(status.st_size));
+    const std::array<timespec, 2> times{timespec{0, UTIME_OMIT},
+                                        timespec{status.st_mtim.tv_sec, 0}};
+    if (::futimens(copy_.get(), times.data()) != 0 || ::fstat(copy_.get(), &copied_) != 0)
+    {
+        raiseUncopied(errno, path_);
+    }
+}
+
+void IndexCopy::copyContent(const FileDescriptor &source, std::size_t size) const
+{
+    // One byte more than there should be, to see the end without another block.
+    std::string block(std::min(size + 1, blockSize), '\0');
+    for (;;)
+    {
+        const ssize_t count = ::read(source.get(), block.data(), block.size());
+        if (count == 0)
+        {
+            return;
+        }
+        if (count < 0 && errno != EINTR)
+        {
+            raiseUnreadable(errno, index_);
+        }
+        const std::size_t read = count < 0 ? 0 : static_cast<std::size_t>(count);
+        const int error = writeAll(copy_, block.data(), read);
+        if (error != 0)
+        {
+            raiseUncopied(error, path_);
+        }
+    }
+}
+
+int IndexCopy::replaceIndex() const noexcept
+{
+    struct stat now = {};
+    if (::stat(path_.c_str(), &now) != 0)
+    {
+        return errno == ENOENT ? 0 : errno;
+    }
+    const bool isWritten = now.st_ino != copied_.st_ino || now.st_dev != copied_.st_dev;
+    return isWritten && ::rename(path_.c_str(), index_.c_str()) != 0 ? errno : 0;
+}
+
+} // namespace vclink::git

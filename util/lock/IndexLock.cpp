@@ -1,0 +1,158 @@
+// SPDX-License-Identifier: MIT
+#include "util/lock/IndexLock.hpp"
+
+#include <cerrno>
+#include <climits>
+#include <cstddef>
+#include <string>
+#include <utility>
+
+#include <fcntl.h>
+#include <git2/errors.h>
+#include <git2/index.h>
+#include <git2/repository.h>
+#include <git2/sys/repository.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include "error/errorUtil/GitResult.hpp"
+#include "error/errorUtil/raiseGitError.hpp"
+#include "error/errorUtil/raiseSystemError.hpp"
+#include "util/lock/IndexCopy.hpp"
+#include "util/repository/repository.hpp"
+#include "util/scope/FileDescriptor.hpp"
+
+namespace vclink::git
+{
+namespace
+{
+
+/// As many as git and libgit2 follow.
+constexpr int maximumLinks = 5;
+
+[[noreturn]] void raiseUnresolvable(int error, const std::string &index)
+{
+    raiseSystemError(error, "failed to read index: '" + index + "'", GIT_ERROR_INDEX);
+}
+
+/// What the link leads to; empty when the path is no link.
+std::string readIndexLink(const std::string &path)
+{
+    struct stat status = {};
+    if (::lstat(path.c_str(), &status) != 0 && errno != ENOENT)
+    {
+        raiseUnresolvable(errno, path);
+    }
+    if (!S_ISLNK(status.st_mode))
+    {
+        return {};
+    }
+    std::string target(PATH_MAX, '\0');
+    const ssize_t size = ::readlink(path.c_str(), target.data(), target.size());
+    if (size < 0)
+    {
+        raiseUnresolvable(errno, path);
+    }
+    target.resize(static_cast<std::size_t>(size));
+    return target;
+}
+
+/// The file that is locked and replaced, which for a symbolic link is what it leads to.
+std::string findIndex(git_repository *repository)
+{
+    std::string path = git_repository_path(repository) + std::string("index");
+    for (int links = 0; links < maximumLinks; ++links)
+    {
+        const std::string target = readIndexLink(path);
+        if (target.empty())
+        {
+            return path;
+        }
+        const std::string folder = path.substr(0, path.rfind('/') + 1);
+        path = target.front() == '/' ? target : folder + target;
+    }
+    raiseUnresolvable(ELOOP, path);
+}
+
+[[noreturn]] void raiseLocked(const std::string &lock)
+{
+    raiseGitError(GIT_ELOCKED, GIT_ERROR_INDEX,
+                  "the index is locked by '" + lock +
+                      "'; this might be due to a concurrent or crashed process");
+}
+
+} // namespace
+
+/// The lock's file, which git and libgit2 respect.
+class IndexLock::LockFile
+{
+  public:
+    explicit LockFile(std::string path) : path_(std::move(path))
+    {
+        const FileDescriptor file(
+            ::open(path_.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, S_IRUSR | S_IWUSR));
+        if (!file && errno == EEXIST)
+        {
+            raiseLocked(path_);
+        }
+        if (!file)
+        {
+            raiseSystemError(errno, "failed to create locked file '" + path_ + "'");
+        }
+    }
+    LockFile(const LockFile &) = delete;
+    LockFile &operator=(const LockFile &) = delete;
+    ~LockFile()
+    {
+        ::unlink(path_.c_str());
+    }
+
+  private:
+    std::string path_;
+};
+
+/// What lasts as long as the lock. The copy goes first: whoever takes the lock next makes its own.
+class IndexLock::Held
+{
+  public:
+    explicit Held(std::string index) : path(std::move(index)), lock(path + ".lock"), copy(path)
+    {
+    }
+
+    const std::string path;
+    const LockFile lock;
+    const IndexCopy copy;
+};
+
+IndexLock::IndexLock(git_repository *repository)
+    : held_(std::make_unique<Held>(findIndex(repository)))
+{
+    const OwnedHandle<git_index> index = openIndex(held_->copy.path().c_str());
+    call(git_repository_set_index, repository, index.get()).value();
+    call(git_index_set_caps, index.get(), GIT_INDEX_CAPABILITY_FROM_OWNER).value();
+}
+
+IndexLock::~IndexLock()
+{
+    if (held_ != nullptr)
+    {
+        static_cast<void>(held_->copy.replaceIndex());
+    }
+}
+
+void IndexLock::publish()
+{
+    const int error = held_->copy.replaceIndex();
+    if (error != 0)
+    {
+        raiseSystemError(error, "could not replace the index '" + held_->path + "'");
+    }
+}
+
+void IndexLock::release()
+{
+    publish();
+    held_.reset();
+}
+
+} // namespace vclink::git

@@ -1,0 +1,209 @@
+// SPDX-License-Identifier: MIT
+#include "util/path/paths.hpp"
+
+#include <algorithm>
+#include <climits>
+#include <cstdint>
+#include <cstring>
+#include <string_view>
+
+#include <boost/filesystem/operations.hpp>
+
+#include "error/errorUtil/gitString.hpp"
+#include "fl/filesystem/detail/path_text.hpp"
+#include "fl/i18n/convert.hpp"
+
+namespace vclink::git
+{
+namespace
+{
+
+namespace fs = boost::filesystem;
+
+bool isName(std::string_view element)
+{
+    return !element.empty() && element != "." && element != "..";
+}
+
+bool hasWorkingFolder()
+{
+    boost::system::error_code error;
+    fs::current_path(error);
+    return !error;
+}
+
+/// What boost::filesystem::weakly_canonical gives of an absolute path.
+fs::path resolveFromRoot(const fs::path &path)
+{
+    fs::path existing = path;
+    fs::path missing;
+    while (existing.has_relative_path() && !fs::exists(existing))
+    {
+        missing = missing.empty() ? existing.filename() : existing.filename() / missing;
+        existing = existing.parent_path();
+    }
+    existing = fs::canonical(existing, existing.root_path());
+    return missing.empty() ? existing : (existing / missing).lexically_normal();
+}
+
+/// Boost asks for the working folder even if the path is absolute, and fails if that folder is
+/// gone.
+fs::path weaklyCanonical(const fs::path &path)
+{
+    try
+    {
+        return fs::weakly_canonical(path);
+    }
+    catch (const fs::filesystem_error &)
+    {
+        if (!path.is_absolute() || hasWorkingFolder())
+        {
+            throw;
+        }
+    }
+    return resolveFromRoot(path);
+}
+
+/// A separator at the end is kept by Boost 1.81. Boost 1.74 leaves it out where the path exists,
+/// and puts "." behind it elsewhere: so it is here with every release.
+fs::path canonical(const fs::path &path)
+{
+    fs::path result = weaklyCanonical(path);
+    const std::string &text = result.native();
+    if (text.size() < 2 || text.back() != '/')
+    {
+        return result;
+    }
+    boost::system::error_code ignored;
+    return fs::exists(path, ignored) ? fs::path(text.substr(0, text.size() - 1)) : result / ".";
+}
+
+/// A path cut into a folder that is given without "." and "..", and a name in it: the two can be
+/// resolved one after the other. No folder where the path can't be cut so.
+struct NameInFolder
+{
+    std::string_view folder;
+    std::string_view name;
+};
+
+NameInFolder cut(std::string_view path)
+{
+    const std::size_t slash = path.rfind('/');
+    // Longer than the system takes: refused as a whole, not followed element by element.
+    const bool isTooLong = path.size() >= PATH_MAX;
+    if (isTooLong || slash == std::string_view::npos || slash == 0 ||
+        !isName(path.substr(slash + 1)))
+    {
+        return {};
+    }
+    const std::string_view folder = path.substr(0, slash);
+    for (std::size_t begin = folder.front() == '/' ? 1 : 0; begin <= folder.size();)
+    {
+        const std::size_t end = std::min(folder.find('/', begin), folder.size());
+        if (!isName(folder.substr(begin, end - begin)))
+        {
+            return {};
+        }
+        begin = end + 1;
+    }
+    return {folder, path.substr(slash + 1)};
+}
+
+bool isAscii(std::string_view text)
+{
+    constexpr std::uint64_t highBits = 0x8080808080808080U;
+    std::uint64_t seen = 0;
+    for (; text.size() >= sizeof seen; text.remove_prefix(sizeof seen))
+    {
+        std::uint64_t word = 0;
+        std::memcpy(&word, text.data(), sizeof word);
+        seen |= word;
+    }
+    for (const char unit : text)
+    {
+        seen |= static_cast<unsigned char>(unit);
+    }
+    return (seen & highBits) == 0;
+}
+
+/// Puts the name into `converted`, whose room is used again where the name is ASCII, as nearly all
+/// are: this runs once for each file of a status walk.
+void convertName(const char *name, ustring &converted)
+{
+    const std::string_view units(name);
+    if (!isAscii(units))
+    {
+        converted = fl::i18n::utf8_to_ustring(name);
+        return;
+    }
+    converted.resize(units.size());
+    std::transform(units.begin(), units.end(), converted.begin(),
+                   [](char unit) { return static_cast<char16_t>(unit); });
+}
+
+} // namespace
+
+RootRelativePaths::RootRelativePaths(const upath &root)
+    : given_(toGitString(root.string())), root_(canonical(given_))
+{
+}
+
+std::string RootRelativePaths::relative(const upath &path)
+{
+    std::string text = resolve(toGitString(path.string()));
+    std::replace(text.begin(), text.end(), '\\', '/');
+    return text;
+}
+
+std::string RootRelativePaths::resolve(const std::string &path)
+{
+    const auto [folder, name] = cut(path);
+    const FolderBelowRoot below =
+        folder.empty() ? FolderBelowRoot() : findFolder(std::string(folder));
+    if (!below || fs::is_symlink(fs::symlink_status(path)))
+    {
+        return canonical(path).lexically_relative(root_).string();
+    }
+    return (*below == "." ? std::string() : *below + '/').append(name);
+}
+
+const RootRelativePaths::FolderBelowRoot &RootRelativePaths::findFolder(const std::string &folder)
+{
+    const auto known = folders_.find(folder);
+    if (known != folders_.end())
+    {
+        return known->second;
+    }
+    // Step by step only from the root on: above it nothing would be found below it.
+    const bool isGivenBelow = folder.size() > given_.size() && folder.rfind(given_ + '/', 0) == 0;
+    const std::string relative =
+        isGivenBelow ? resolve(folder) : canonical(folder).lexically_relative(root_).string();
+    const bool isBelow = !relative.empty() && relative != ".." && relative.rfind("../", 0) != 0;
+    return folders_.emplace(folder, FolderBelowRoot(isBelow, relative)).first->second;
+}
+
+ustring relativeToRoot(const upath &root, const upath &path)
+{
+    return fl::i18n::utf8_to_ustring(RootRelativePaths(root).relative(path));
+}
+
+upath joinRepositoryPath(const upath &root, const char *name)
+{
+    ustring buffer;
+    return joinRepositoryPath(root, name, buffer);
+}
+
+upath joinRepositoryPath(const upath &root, const char *name, ustring &buffer)
+{
+    convertName(name, buffer);
+    ustring text;
+    text.reserve(root.string().size() + 1 + buffer.size());
+    text = root.string();
+    if (!buffer.empty())
+    {
+        fl::filesystem::detail::concatenate_pathname(text, buffer, root.native());
+    }
+    return upath(std::move(text), root.native());
+}
+
+} // namespace vclink::git

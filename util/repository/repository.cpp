@@ -1,0 +1,161 @@
+// SPDX-License-Identifier: MIT
+#include "util/repository/repository.hpp"
+
+#include <cerrno>
+#include <string>
+
+#include <git2.h>
+#include <sys/stat.h>
+
+#include "error/errorUtil/gitString.hpp"
+#include "error/errorUtil/raiseSystemError.hpp"
+
+namespace vclink::git
+{
+namespace
+{
+
+/// libgit2 takes an index file that it can't look at for one that is not there. Whoever then writes
+/// the index, or commits it, takes every file out of it.
+void readAgainIfEmpty(git_index *index)
+{
+    const char *const path = git_index_path(index);
+    if (git_index_entrycount(index) != 0 || path == nullptr)
+    {
+        return;
+    }
+    struct stat status = {};
+    if (::stat(path, &status) == 0)
+    {
+        call(git_index_read, index, 1).value();
+    }
+    else if (errno != ENOENT)
+    {
+        raiseSystemError(errno, std::string("could not read the index '") + path + "'");
+    }
+}
+
+/// libgit2 takes a file that it can't look at for one that is not there.
+bool hasMergeHead(git_repository *repository)
+{
+    const std::string path = git_repository_path(repository) + std::string("MERGE_HEAD");
+    struct stat status = {};
+    if (::stat(path.c_str(), &status) == 0)
+    {
+        return true;
+    }
+    if (errno != ENOENT)
+    {
+        raiseSystemError(errno, "could not read '" + path + "'");
+    }
+    return false;
+}
+
+} // namespace
+
+bool isRepository(const upath &path)
+{
+    const std::string folder = toGitString(path.string());
+    const GitResult<void> probe = call(git_repository_open_ext, nullptr, folder.c_str(),
+                                       GIT_REPOSITORY_OPEN_NO_SEARCH, nullptr);
+    if (probe.has_error() && probe.error().getCode() == GIT_ENOTFOUND)
+    {
+        return false;
+    }
+    probe.value();
+    return true;
+}
+
+OwnedHandle<git_repository> openRepository(const upath &root)
+{
+    const std::string folder = toGitString(root.string());
+    return acquire<git_repository>(git_repository_open_ext, folder.c_str(),
+                                   GIT_REPOSITORY_OPEN_NO_SEARCH, nullptr)
+        .value();
+}
+
+int readRepositoryState(git_repository *repository)
+{
+    const int state = git_repository_state(repository);
+    // The commit that concludes a merge would forget the other side.
+    return state == GIT_REPOSITORY_STATE_NONE && hasMergeHead(repository)
+               ? git_repository_state(repository)
+               : state;
+}
+
+void cleanUpRepositoryState(git_repository *repository)
+{
+    call(git_repository_state_cleanup, repository).value();
+    // The next commit would be one of the same merge.
+    if (hasMergeHead(repository))
+    {
+        call(git_repository_state_cleanup, repository).value();
+    }
+}
+
+OwnedHandle<git_index> getRepositoryIndex(git_repository *repository)
+{
+    OwnedHandle<git_index> index = acquire<git_index>(git_repository_index, repository).value();
+    readAgainIfEmpty(index.get());
+    return index;
+}
+
+OwnedHandle<git_index> openIndex(const char *path)
+{
+    OwnedHandle<git_index> index = acquire<git_index>(git_index_open, path).value();
+    readAgainIfEmpty(index.get());
+    return index;
+}
+
+void writeIndex(git_index *index)
+{
+    call(git_index_write, index).value();
+}
+
+git_oid writeIndexTree(git_index *index)
+{
+    git_oid id{};
+    call(git_index_write_tree, &id, index).value();
+    return id;
+}
+
+OwnedHandle<git_tree> lookupTree(git_repository *repository, const git_oid *id)
+{
+    return acquire<git_tree>(git_tree_lookup, repository, id).value();
+}
+
+GitResult<OwnedHandle<git_object>> revparseObject(git_repository *repository,
+                                                  const std::string &spec)
+{
+    return acquire<git_object>(git_revparse_single, repository, asGitString(spec));
+}
+
+const git_oid *revparseId(const std::string &spec, git_repository *repository)
+{
+    // libgit2's cache refuses blobs and objects over 4 KiB, so that releasing the object may free
+    // the id that lies in it. The copy is taken before.
+    thread_local git_oid copy;
+    const OwnedHandle<git_object> object = revparseObject(repository, spec).value();
+    git_oid_cpy(&copy, git_object_id(object.get()));
+    return &copy;
+}
+
+git_oid readHeadId(git_repository *repository)
+{
+    git_oid id{};
+    call(git_reference_name_to_id, &id, repository, "HEAD").value();
+    return id;
+}
+
+GitResult<OwnedHandle<git_commit>> lookupCommitByName(const char *name, git_repository *repository)
+{
+    const auto reference = acquire<git_reference>(git_reference_dwim, repository, name);
+    if (reference.has_error())
+    {
+        return reference.error();
+    }
+    return acquire<git_commit>(git_commit_lookup, repository,
+                               git_reference_target(reference.value().get()));
+}
+
+} // namespace vclink::git

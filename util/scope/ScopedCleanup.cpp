@@ -1,0 +1,22 @@
+// SPDX-License-Identifier: MIT
+#include "util/scope/ScopedCleanup.hpp"
+
+namespace vclink::git
+{
+
+ScopedCleanup::~ScopedCleanup()
+{
+    try
+    {
+        const std::function<void()> cleanup = std::exchange(cleanup_, nullptr);
+        if (cleanup)
+        {
+            cleanup();
+        }
+    }
+    catch (...) // The scope's own outcome stands.
+    {
+    }
+}
+
+} // namespace vclink::git
