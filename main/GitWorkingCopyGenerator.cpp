@@ -60,7 +60,7 @@ void GitWorkingCopyGenerator::generate(const ustring &repositorySpecifier, const
     const std::string path = toGitString(sandboxRoot.string());
     const CloneOptions options = impl_->optionsFactory->makeCloneOptions();
     const git_clone_options record = toGitCloneOptions(options, *impl_->callbacks);
-    const SigpipeGuard sigpipe;
+    const SigpipeBlock sigpipe;
     // Its checkout needs no CheckoutWatch: libgit2 clones into a new or an empty folder only.
     acquire<git_repository>(git_clone, url.c_str(), path.c_str(), &record).value();
 }

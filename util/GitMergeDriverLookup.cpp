@@ -27,7 +27,7 @@ struct ReleaseConfigEntry
 };
 using OwnedConfigEntry = std::unique_ptr<git_config_entry, ReleaseConfigEntry>;
 
-void reportMissing(const MergeSides &sides)
+void reportMissing(const FileVersions &sides)
 {
     if (sides.ancestor == nullptr)
     {
@@ -54,7 +54,7 @@ int wildcardGitDriverApplyCallback(git_merge_driver * /*self*/, const char **pat
         "uint32_t*, git_buf*, const char*, const git_merge_driver_source*)",
         "util/GitMergeDriverLookup", 101);
     writeRecord(SeverityParameter, " filter_name=", filterName);
-    const MergeSides sides(source);
+    const FileVersions sides(source);
     if (!sides.areComplete())
     {
         reportMissing(sides);

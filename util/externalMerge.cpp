@@ -84,24 +84,24 @@ std::vector<char> readFile(const upath &file)
 
 } // namespace
 
-MergeSides::MergeSides(const git_merge_driver_source *source)
+FileVersions::FileVersions(const git_merge_driver_source *source)
     : ancestor(git_merge_driver_source_ancestor(source)),
       ours(git_merge_driver_source_ours(source)), theirs(git_merge_driver_source_theirs(source)),
       options(git_merge_driver_source_file_options(source))
 {
 }
 
-const char *MergeSides::resultPath() const noexcept
+const char *FileVersions::resultPath() const noexcept
 {
     return std::strcmp(ancestor->path, ours->path) == 0 ? theirs->path : ours->path;
 }
 
-std::uint32_t MergeSides::resultMode() const noexcept
+std::uint32_t FileVersions::resultMode() const noexcept
 {
     return ancestor->mode == ours->mode ? theirs->mode : ours->mode;
 }
 
-int runExternalMerge(const std::string &command, const MergeSides &sides,
+int runExternalMerge(const std::string &command, const FileVersions &sides,
                      git_repository *repository, const MergedFile &merged)
 {
     const SideFile ancestor(*sides.ancestor, repository);

@@ -11,9 +11,9 @@ namespace vclink::git
 
 /// The three versions of a file that is merged, and how libgit2 would merge it. Points into
 /// libgit2's own entries.
-struct MergeSides
+struct FileVersions
 {
-    explicit MergeSides(const git_merge_driver_source *source);
+    explicit FileVersions(const git_merge_driver_source *source);
 
     bool areComplete() const noexcept
     {
@@ -48,7 +48,7 @@ struct MergedFile
 /// @return 0, or GIT_EMERGECONFLICT when the command does not succeed
 /// @throws LibGit2Exception when a blob can't be read or the content not be handed over, and what
 /// runCommand() raises
-int runExternalMerge(const std::string &command, const MergeSides &sides,
+int runExternalMerge(const std::string &command, const FileVersions &sides,
                      git_repository *repository, const MergedFile &merged);
 
 } // namespace vclink::git

@@ -76,7 +76,7 @@ BasicGitRemote::~BasicGitRemote() = default;
 
 void BasicGitRemote::fetch(const std::vector<ustring> &refspecs)
 {
-    const SigpipeGuard sigpipe;
+    const SigpipeBlock sigpipe;
     const char *const name = asGitString(name_);
     const PathspecArray array = makeStringPathspec(refspecs);
     const OwnedHandle<git_repository> repository = adapter_.getRepository();
@@ -88,7 +88,7 @@ void BasicGitRemote::fetch(const std::vector<ustring> &refspecs)
 
 void BasicGitRemote::push(const std::vector<ustring> &refspecs)
 {
-    const SigpipeGuard sigpipe;
+    const SigpipeBlock sigpipe;
     const char *const name = asGitString(name_);
     const PathspecArray array = makeStringPathspec(refspecs);
     const OwnedHandle<git_repository> repository = adapter_.getRepository();
@@ -100,7 +100,7 @@ void BasicGitRemote::push(const std::vector<ustring> &refspecs)
 
 std::vector<GitRemoteHead> BasicGitRemote::getRemoteHeads() const
 {
-    const SigpipeGuard sigpipe;
+    const SigpipeBlock sigpipe;
     const char *const name = asGitString(name_);
     const OwnedHandle<git_repository> repository = adapter_.getRepository();
     const OwnedHandle<git_remote> remote = lookupRemote(repository.get(), name);

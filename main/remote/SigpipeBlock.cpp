@@ -36,13 +36,13 @@ void consumeSigpipe() noexcept
 
 } // namespace
 
-SigpipeGuard::SigpipeGuard() noexcept : maskBefore_(), wasPending_(isSigpipePending())
+SigpipeBlock::SigpipeBlock() noexcept : maskBefore_(), wasPending_(isSigpipePending())
 {
     const sigset_t signals = makeSigpipeSet();
     pthread_sigmask(SIG_BLOCK, &signals, &maskBefore_);
 }
 
-SigpipeGuard::~SigpipeGuard()
+SigpipeBlock::~SigpipeBlock()
 {
     const int errorBefore = errno;
     if (!wasPending_)

@@ -35,7 +35,7 @@ extern "C" ssize_t read(int descriptor, void *buffer, size_t size)
 namespace
 {
 
-using vclink::git::StartGuard;
+using vclink::git::FailedStartCleanup;
 using vclink::test::hasChildren;
 
 /// A child that has ended like one that could not become the command, and the ends of a pipe.
@@ -57,7 +57,7 @@ class ChildList : public testing::Test
     {
         readError = error;
         failingReads = failuresBefore;
-        const StartGuard guard(ends_[0], ends_[1]);
+        const FailedStartCleanup guard(ends_[0], ends_[1]);
         EXPECT_EQ(failingReads, 0);
         const pid_t child = ::fork();
         if (child == 0)

@@ -20,19 +20,19 @@
 namespace
 {
 
-using vclink::git::StartGuard;
+using vclink::git::FailedStartCleanup;
 using vclink::test::DescriptorLimit;
 using vclink::test::hasChildren;
 
 /// The two ends of a pipe, closed at the end unless they are closed already.
-class StartGuardTest : public testing::Test
+class FailedStartCleanupTest : public testing::Test
 {
   protected:
-    StartGuardTest()
+    FailedStartCleanupTest()
     {
         EXPECT_EQ(::pipe2(ends_.data(), O_CLOEXEC), 0);
     }
-    ~StartGuardTest() override
+    ~FailedStartCleanupTest() override
     {
         for (const int end : ends_)
         {
@@ -72,20 +72,20 @@ class StartGuardTest : public testing::Test
     std::array<int, 2> ends_{-1, -1};
 };
 
-TEST_F(StartGuardTest, ClosesTheWritingEndWhenNothingHasStarted)
+TEST_F(FailedStartCleanupTest, ClosesTheWritingEndWhenNothingHasStarted)
 {
     {
-        const StartGuard guard(source(), sink());
+        const FailedStartCleanup guard(source(), sink());
         EXPECT_TRUE(isOpen(sink()));
     }
     EXPECT_FALSE(isOpen(sink()));
     EXPECT_TRUE(isOpen(source()));
 }
 
-TEST_F(StartGuardTest, LeavesANumberThatIsAnotherFilesByThen)
+TEST_F(FailedStartCleanupTest, LeavesANumberThatIsAnotherFilesByThen)
 {
     {
-        const StartGuard guard(source(), sink());
+        const FailedStartCleanup guard(source(), sink());
         ::close(sink());
         const int other = ::open("/dev/null", O_RDONLY | O_CLOEXEC);
         EXPECT_EQ(other, sink());
@@ -93,11 +93,11 @@ TEST_F(StartGuardTest, LeavesANumberThatIsAnotherFilesByThen)
     EXPECT_TRUE(isOpen(sink()));
 }
 
-TEST_F(StartGuardTest, LeavesANumberThatIsAnotherPipesByThen)
+TEST_F(FailedStartCleanupTest, LeavesANumberThatIsAnotherPipesByThen)
 {
     std::array<int, 2> other{-1, -1};
     {
-        const StartGuard guard(source(), sink());
+        const FailedStartCleanup guard(source(), sink());
         ::close(sink());
         EXPECT_EQ(::pipe2(other.data(), O_CLOEXEC), 0);
         EXPECT_EQ(other[0], sink());
@@ -107,32 +107,32 @@ TEST_F(StartGuardTest, LeavesANumberThatIsAnotherPipesByThen)
     ::close(other[1]);
 }
 
-TEST_F(StartGuardTest, LeavesAnEndThatIsClosedAlready)
+TEST_F(FailedStartCleanupTest, LeavesAnEndThatIsClosedAlready)
 {
     {
-        const StartGuard guard(source(), sink());
+        const FailedStartCleanup guard(source(), sink());
         ::close(sink());
     }
     EXPECT_FALSE(isOpen(sink()));
     EXPECT_TRUE(isOpen(source()));
 }
 
-TEST_F(StartGuardTest, WaitsForTheChildThatCouldNotBecomeTheCommand)
+TEST_F(FailedStartCleanupTest, WaitsForTheChildThatCouldNotBecomeTheCommand)
 {
     {
-        const StartGuard guard(source(), sink());
+        const FailedStartCleanup guard(source(), sink());
         makeChild(EXIT_FAILURE);
         EXPECT_TRUE(hasChildren());
     }
     EXPECT_FALSE(hasChildren());
 }
 
-TEST_F(StartGuardTest, LeavesTheChildrenThatWereThereBefore)
+TEST_F(FailedStartCleanupTest, LeavesTheChildrenThatWereThereBefore)
 {
     const pid_t earlier = makeChild(EXIT_FAILURE);
     awaitEnd(earlier);
     {
-        const StartGuard guard(source(), sink());
+        const FailedStartCleanup guard(source(), sink());
         makeChild(EXIT_FAILURE);
     }
     int status = 0;
@@ -140,7 +140,7 @@ TEST_F(StartGuardTest, LeavesTheChildrenThatWereThereBefore)
     EXPECT_EQ(WEXITSTATUS(status), EXIT_FAILURE);
 }
 
-TEST_F(StartGuardTest, LeavesChildrenThatCouldNotBeListedBefore)
+TEST_F(FailedStartCleanupTest, LeavesChildrenThatCouldNotBeListedBefore)
 {
     const pid_t earlier = makeChild(EXIT_FAILURE);
     awaitEnd(earlier);
@@ -148,18 +148,18 @@ TEST_F(StartGuardTest, LeavesChildrenThatCouldNotBeListedBefore)
     const int writing = sink();
     {
         std::optional<DescriptorLimit> none(0);
-        const StartGuard guard(reading, writing);
+        const FailedStartCleanup guard(reading, writing);
         none.reset();
     }
     EXPECT_EQ(::waitpid(earlier, nullptr, WNOHANG), earlier);
 }
 
-TEST_F(StartGuardTest, LeavesChildrenThatCannotBeListedAfterwards)
+TEST_F(FailedStartCleanupTest, LeavesChildrenThatCannotBeListedAfterwards)
 {
     pid_t child = 0;
     std::optional<DescriptorLimit> none;
     {
-        const StartGuard guard(source(), sink());
+        const FailedStartCleanup guard(source(), sink());
         child = makeChild(EXIT_FAILURE);
         none.emplace(0);
     }
@@ -167,10 +167,10 @@ TEST_F(StartGuardTest, LeavesChildrenThatCannotBeListedAfterwards)
     EXPECT_EQ(::waitpid(child, nullptr, 0), child);
 }
 
-TEST_F(StartGuardTest, WaitsForAChildThatTakesItsTimeToEnd)
+TEST_F(FailedStartCleanupTest, WaitsForAChildThatTakesItsTimeToEnd)
 {
     {
-        const StartGuard guard(source(), sink());
+        const FailedStartCleanup guard(source(), sink());
         const pid_t child = ::fork();
         if (child == 0)
         {
@@ -181,7 +181,7 @@ TEST_F(StartGuardTest, WaitsForAChildThatTakesItsTimeToEnd)
     EXPECT_FALSE(hasChildren());
 }
 
-TEST_F(StartGuardTest, ListsAnyNumberOfChildren)
+TEST_F(FailedStartCleanupTest, ListsAnyNumberOfChildren)
 {
     std::vector<pid_t> earlier;
     // Their list is longer than one reading of it.
@@ -192,7 +192,7 @@ TEST_F(StartGuardTest, ListsAnyNumberOfChildren)
     }
     pid_t last = 0;
     {
-        const StartGuard guard(source(), sink());
+        const FailedStartCleanup guard(source(), sink());
         last = makeChild(EXIT_FAILURE);
     }
     EXPECT_EQ(::waitpid(last, nullptr, WNOHANG), -1);
@@ -200,24 +200,24 @@ TEST_F(StartGuardTest, ListsAnyNumberOfChildren)
         EXPECT_EQ(::waitpid(child, nullptr, WNOHANG), child);
 }
 
-TEST_F(StartGuardTest, LeavesAChildThatEndsInAnotherWay)
+TEST_F(FailedStartCleanupTest, LeavesAChildThatEndsInAnotherWay)
 {
     pid_t other = 0;
     {
-        const StartGuard guard(source(), sink());
+        const FailedStartCleanup guard(source(), sink());
         other = makeChild(0);
     }
     EXPECT_EQ(::waitpid(other, nullptr, 0), other);
 }
 
-TEST_F(StartGuardTest, LeavesTheChildrenOfOtherThreads)
+TEST_F(FailedStartCleanupTest, LeavesTheChildrenOfOtherThreads)
 {
     std::promise<pid_t> made;
     std::promise<void> done;
     std::thread other;
     pid_t foreign = 0;
     {
-        const StartGuard guard(source(), sink());
+        const FailedStartCleanup guard(source(), sink());
         // A thread that goes on living keeps its children.
         other = std::thread(
             [&made, &done]
@@ -236,11 +236,11 @@ TEST_F(StartGuardTest, LeavesTheChildrenOfOtherThreads)
     other.join();
 }
 
-TEST_F(StartGuardTest, LeavesChildrenThatItCannotTellFromOneAnother)
+TEST_F(FailedStartCleanupTest, LeavesChildrenThatItCannotTellFromOneAnother)
 {
     std::array<pid_t, 2> children{};
     {
-        const StartGuard guard(source(), sink());
+        const FailedStartCleanup guard(source(), sink());
         for (pid_t &child : children)
             child = makeChild(EXIT_FAILURE);
     }
@@ -248,10 +248,10 @@ TEST_F(StartGuardTest, LeavesChildrenThatItCannotTellFromOneAnother)
         EXPECT_EQ(::waitpid(child, nullptr, 0), child);
 }
 
-TEST_F(StartGuardTest, WaitsForAStartedChildThatWasKilled)
+TEST_F(FailedStartCleanupTest, WaitsForAStartedChildThatWasKilled)
 {
     {
-        StartGuard guard(source(), sink());
+        FailedStartCleanup guard(source(), sink());
         const pid_t child = ::fork();
         if (child == 0)
         {
@@ -265,11 +265,11 @@ TEST_F(StartGuardTest, WaitsForAStartedChildThatWasKilled)
     EXPECT_TRUE(isOpen(sink()));
 }
 
-TEST_F(StartGuardTest, LeavesEverythingWhenTheCommandHasEnded)
+TEST_F(FailedStartCleanupTest, LeavesEverythingWhenTheCommandHasEnded)
 {
     pid_t child = 0;
     {
-        StartGuard guard(source(), sink());
+        FailedStartCleanup guard(source(), sink());
         child = makeChild(EXIT_FAILURE);
         guard.hasStarted(child);
         guard.hasEnded();
@@ -278,9 +278,9 @@ TEST_F(StartGuardTest, LeavesEverythingWhenTheCommandHasEnded)
     EXPECT_EQ(::waitpid(child, nullptr, 0), child);
 }
 
-TEST_F(StartGuardTest, IsContentWhenTheStatusOfTheChildIsGone)
+TEST_F(FailedStartCleanupTest, IsContentWhenTheStatusOfTheChildIsGone)
 {
-    StartGuard guard(source(), sink());
+    FailedStartCleanup guard(source(), sink());
     const pid_t child = makeChild(0);
     guard.hasStarted(child);
     EXPECT_EQ(::waitpid(child, nullptr, 0), child);

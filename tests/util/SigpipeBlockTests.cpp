@@ -138,7 +138,7 @@ class BlockedSigpipe
     int error = 0;
     if (isGuarded)
     {
-        const SigpipeGuard guard;
+        const SigpipeBlock guard;
         error = connection.writeUntilBroken();
     }
     else
@@ -156,18 +156,18 @@ class BlockedSigpipe
         byte = 0xFF;
 }
 
-TEST(SigpipeGuardDeathTest, LetsABrokenConnectionFailWithoutEndingTheProcess)
+TEST(SigpipeBlockDeathTest, LetsABrokenConnectionFailWithoutEndingTheProcess)
 {
     EXPECT_EXIT(breakConnection(true), testing::ExitedWithCode(0), "");
     EXPECT_EXIT(breakConnection(false), testing::KilledBySignal(SIGPIPE), "")
         << "nothing was to be guarded against";
 }
 
-TEST(SigpipeGuard, BlocksTheSignalForItsLife)
+TEST(SigpipeBlock, BlocksTheSignalForItsLife)
 {
     ASSERT_FALSE(isBlocked(SIGPIPE));
     {
-        const SigpipeGuard guard;
+        const SigpipeBlock guard;
         EXPECT_TRUE(isBlocked(SIGPIPE));
         EXPECT_FALSE(isBlocked(SIGINT));
         EXPECT_FALSE(isBlocked(SIGTERM));
@@ -175,40 +175,40 @@ TEST(SigpipeGuard, BlocksTheSignalForItsLife)
     EXPECT_FALSE(isBlocked(SIGPIPE));
 }
 
-TEST(SigpipeGuard, BlocksNoOtherSignal)
+TEST(SigpipeBlock, BlocksNoOtherSignal)
 {
     leaveBitsOnTheStack();
-    const SigpipeGuard guard;
+    const SigpipeBlock guard;
     for (int signal = 1; signal < 32; ++signal)
         EXPECT_EQ(isBlocked(signal), signal == SIGPIPE) << signal;
 }
 
-TEST(SigpipeGuard, LeavesASignalBlockedThatWasBlocked)
+TEST(SigpipeBlock, LeavesASignalBlockedThatWasBlocked)
 {
     const BlockedSigpipe blocked;
     {
-        const SigpipeGuard guard;
+        const SigpipeBlock guard;
     }
     EXPECT_TRUE(isBlocked(SIGPIPE));
 }
 
-TEST(SigpipeGuard, TakesAwayASignalThatCameInBetween)
+TEST(SigpipeBlock, TakesAwayASignalThatCameInBetween)
 {
     const BlockedSigpipe blocked;
     {
-        const SigpipeGuard guard;
+        const SigpipeBlock guard;
         ::raise(SIGPIPE);
         ASSERT_TRUE(isPending());
     }
     EXPECT_FALSE(isPending());
 }
 
-TEST(SigpipeGuard, LeavesASignalThatWasPendingBefore)
+TEST(SigpipeBlock, LeavesASignalThatWasPendingBefore)
 {
     const BlockedSigpipe blocked;
     ::raise(SIGPIPE);
     {
-        const SigpipeGuard guard;
+        const SigpipeBlock guard;
         const ResetConnection connection;
         EXPECT_EQ(connection.writeUntilBroken(), EPIPE);
     }
@@ -221,12 +221,12 @@ void countSignal(int /*number*/)
     ++handled;
 }
 
-TEST(SigpipeGuard, LeavesTheHostsHandlerAloneAndAsleep)
+TEST(SigpipeBlock, LeavesTheHostsHandlerAloneAndAsleep)
 {
     handled = 0;
     const test::SignalAction counting(SIGPIPE, countSignal);
     {
-        const SigpipeGuard guard;
+        const SigpipeBlock guard;
         const ResetConnection connection;
         EXPECT_EQ(connection.writeUntilBroken(), EPIPE);
     }
@@ -235,11 +235,11 @@ TEST(SigpipeGuard, LeavesTheHostsHandlerAloneAndAsleep)
     EXPECT_EQ(handled, 1);
 }
 
-TEST(SigpipeGuard, LeavesASignalIgnoredThatWasIgnored)
+TEST(SigpipeBlock, LeavesASignalIgnoredThatWasIgnored)
 {
     const test::SignalAction ignored(SIGPIPE, SIG_IGN);
     {
-        const SigpipeGuard guard;
+        const SigpipeBlock guard;
         const ResetConnection connection;
         EXPECT_EQ(connection.writeUntilBroken(), EPIPE);
     }
@@ -247,14 +247,14 @@ TEST(SigpipeGuard, LeavesASignalIgnoredThatWasIgnored)
     EXPECT_EQ(::raise(SIGPIPE), 0);
 }
 
-TEST(SigpipeGuard, Nests)
+TEST(SigpipeBlock, Nests)
 {
     const test::SignalAction counting(SIGPIPE, countSignal);
     handled = 0;
     {
-        const SigpipeGuard outer;
+        const SigpipeBlock outer;
         {
-            const SigpipeGuard inner;
+            const SigpipeBlock inner;
             ::raise(SIGPIPE);
         }
         EXPECT_TRUE(isBlocked(SIGPIPE));
@@ -265,23 +265,23 @@ TEST(SigpipeGuard, Nests)
     EXPECT_FALSE(isBlocked(SIGPIPE));
 }
 
-TEST(SigpipeGuard, LeavesTheErrorNumber)
+TEST(SigpipeBlock, LeavesTheErrorNumber)
 {
     {
-        const SigpipeGuard guard;
+        const SigpipeBlock guard;
         errno = EXDEV;
     }
     EXPECT_EQ(errno, EXDEV);
 }
 
-TEST(SigpipeGuard, IsForItsThreadOnly)
+TEST(SigpipeBlock, IsForItsThreadOnly)
 {
     std::promise<bool> blockedThere;
     std::promise<void> seen;
     std::thread other(
         [&]
         {
-            const SigpipeGuard guard;
+            const SigpipeBlock guard;
             blockedThere.set_value(isBlocked(SIGPIPE));
             seen.get_future().wait();
         });

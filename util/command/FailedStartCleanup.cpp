@@ -112,12 +112,12 @@ bool hasFailedToStart(pid_t child) noexcept
 
 } // namespace
 
-StartGuard::StartGuard(int source, int sink)
+FailedStartCleanup::FailedStartCleanup(int source, int sink)
     : source_(source), sink_(sink), childrenBefore_(readChildren())
 {
 }
 
-StartGuard::~StartGuard()
+FailedStartCleanup::~FailedStartCleanup()
 {
     if (ended_)
     {
@@ -132,7 +132,7 @@ StartGuard::~StartGuard()
     const ScopedCleanup reaping([this] { reapFailedChild(); });
 }
 
-void StartGuard::closeSink() const noexcept
+void FailedStartCleanup::closeSink() const noexcept
 {
     // Some releases close it themselves; the number may be another file's by then.
     if (referToSameFile(source_, sink_))
@@ -141,7 +141,7 @@ void StartGuard::closeSink() const noexcept
     }
 }
 
-void StartGuard::reapFailedChild() const
+void FailedStartCleanup::reapFailedChild() const
 {
     const std::optional<std::set<pid_t>> children = readChildren();
     if (!childrenBefore_ || !children)

@@ -14,15 +14,15 @@ namespace vclink::git
 /// not become the command; of a command that was killed, the child that nobody has waited for. To
 /// be made right before the start, and to end after the child's own object. Children of the process
 /// that are none of its own are never waited for.
-class StartGuard
+class FailedStartCleanup
 {
   public:
     /// @param source, sink the pipe's two ends, open
     /// @throws std::bad_alloc
-    StartGuard(int source, int sink);
-    StartGuard(const StartGuard &) = delete;
-    StartGuard &operator=(const StartGuard &) = delete;
-    ~StartGuard();
+    FailedStartCleanup(int source, int sink);
+    FailedStartCleanup(const FailedStartCleanup &) = delete;
+    FailedStartCleanup &operator=(const FailedStartCleanup &) = delete;
+    ~FailedStartCleanup();
 
     /// From now on the child is the one to wait for, and the pipe is not touched.
     void hasStarted(pid_t child) noexcept

@@ -139,7 +139,7 @@ int runCommand(const std::string &commandTemplate,
     process::ipstream output(makePipe());
     writeRecord(SeverityDiagnostic, "Command: ", command);
     const std::string usable = makeUsable(command);
-    StartGuard guard(output.pipe().native_source(), output.pipe().native_sink());
+    FailedStartCleanup guard(output.pipe().native_source(), output.pipe().native_sink());
     process::child child(usable, process::std_out > output, process::std_err > process::null,
                          boost::this_process::environment());
     // Where the process can't be forked, Boost.Process raises nothing and gives no child, whose
