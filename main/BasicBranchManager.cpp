@@ -109,14 +109,13 @@ void BasicBranchManager::switchBranch(const BranchName &name)
     CheckoutWatch watch(CheckoutKind::Switch, repository.get(), record);
     watch.lookBeforeSwitch(target.get());
     awaitUnlocked(repository.get(), "HEAD");
-    call(git_checkout_tree, repository.get(), target.get(), &record).value();
+    check(git_checkout_tree, repository.get(), target.get(), &record);
     watch.settleSubmodules();
     lock.publish();
     // Only now, so that a checkout that fails leaves HEAD where it was.
     const char *const head = git_reference_name(branch.get());
-    retryWhileLocked(repository.get(),
-                     [&] { return call(git_repository_set_head, repository.get(), head); })
-        .value();
+    check(retryWhileLocked(repository.get(),
+                           [&] { return call(git_repository_set_head, repository.get(), head); }));
 }
 
 void BasicBranchManager::createBranch(const BranchParameters &parameters)
@@ -153,7 +152,7 @@ void BasicBranchManager::deleteBranch(const BranchName &name)
         const OwnedHandle<git_reference> branch = lookupLocalBranch(repository.get(), shortName);
         return call(git_branch_delete, branch.get());
     };
-    retryWhileLocked(repository.get(), deleteOnce).value();
+    check(retryWhileLocked(repository.get(), deleteOnce));
 }
 
 BranchPointer BasicBranchManager::getCurrentBranch() const
@@ -162,7 +161,7 @@ BranchPointer BasicBranchManager::getCurrentBranch() const
     const OwnedHandle<git_reference> head =
         acquire<git_reference>(git_repository_head, repository.get()).value();
     const char *name = nullptr;
-    call(git_branch_name, &name, head.get()).value();
+    check(git_branch_name, &name, head.get());
     return BranchPointer(name);
 }
 

@@ -52,9 +52,8 @@ GitAttribute GitAttributesImpl::getAttribute(const upath &path, const ustring &n
     const std::string attribute = toGitString(name);
     const OwnedHandle<git_repository> repository = adapter_.getRepository();
     const char *value = nullptr;
-    call(git_attr_get, &value, repository.get(), unsigned{GIT_ATTR_CHECK_FILE_THEN_INDEX},
-         file.c_str(), attribute.c_str())
-        .value();
+    check(git_attr_get, &value, repository.get(), unsigned{GIT_ATTR_CHECK_FILE_THEN_INDEX},
+          file.c_str(), attribute.c_str());
     return {name, classify(value)};
 }
 

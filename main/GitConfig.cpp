@@ -58,7 +58,7 @@ void write(git_config *config, const ToolCommand &tool)
 {
     const std::string key = configKeyString(tool.key);
     const std::string value = quotedCommand(toolLauncherPath(tool), tool.arguments);
-    call(git_config_set_string, config, asGitString(key), asGitString(value)).value();
+    check(git_config_set_string, config, asGitString(key), asGitString(value));
 }
 
 } // namespace

@@ -120,7 +120,7 @@ int runExternalMerge(const std::string &command, const FileVersions &sides,
     }
     writeRecord(SeverityDiagnostic, "Auto-merge successful");
     const std::vector<char> result = readFile(ours.path());
-    call(git_buf_set, merged.content, result.data(), result.size()).value();
+    check(git_buf_set, merged.content, result.data(), result.size());
     // Only now: a driver that fails leaves these as they were.
     *merged.path = sides.resultPath();
     *merged.mode = sides.resultMode();

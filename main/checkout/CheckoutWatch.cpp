@@ -212,10 +212,9 @@ void CheckoutWatch::settleSubmodules() const
 
 void CheckoutWatch::refuse(const Obstacle &obstacle)
 {
-    makeResult(first_(GIT_CHECKOUT_NOTIFY_CONFLICT, obstacle.path.c_str(), nullptr, nullptr,
-                      nullptr, firstPayload_))
-        .value();
-    makeResult(setConflict(obstacle)).value();
+    check(makeResult(first_(GIT_CHECKOUT_NOTIFY_CONFLICT, obstacle.path.c_str(), nullptr, nullptr,
+                            nullptr, firstPayload_)));
+    check(makeResult(setConflict(obstacle)));
 }
 
 int CheckoutWatch::pass(git_checkout_notify_t why, const char *path, const git_diff_file *baseline,

@@ -198,7 +198,7 @@ std::string WorkingCopy::stagedBelow(const std::string &folder) const
 bool WorkingCopy::isIgnored(const std::string &name) const
 {
     int ignored = 0;
-    call(git_ignore_path_is_ignored, &ignored, repository_, name.c_str()).value();
+    check(git_ignore_path_is_ignored, &ignored, repository_, name.c_str());
     return ignored != 0;
 }
 
@@ -226,12 +226,12 @@ git_oid WorkingCopy::idOf(const std::string &name, Standing standing) const
     if (standing == Standing::Link)
     {
         const std::string target = readLink(path);
-        call(git_odb_hash, &id, target.data(), target.size(), GIT_OBJECT_BLOB).value();
+        check(git_odb_hash, &id, target.data(), target.size(), GIT_OBJECT_BLOB);
     }
     else
     {
-        call(git_repository_hashfile, &id, repository_, path.c_str(), GIT_OBJECT_BLOB, name.c_str())
-            .value();
+        check(git_repository_hashfile, &id, repository_, path.c_str(), GIT_OBJECT_BLOB,
+              name.c_str());
     }
     return id;
 }

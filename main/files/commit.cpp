@@ -45,7 +45,7 @@ int collectMergeHead(const git_oid *id, void *payload) noexcept
 std::vector<OwnedHandle<git_commit>> lookupMergeHeads(git_repository *repository)
 {
     std::vector<git_oid> ids;
-    call(git_repository_mergehead_foreach, repository, collectMergeHead, &ids).value();
+    check(git_repository_mergehead_foreach, repository, collectMergeHead, &ids);
     std::vector<OwnedHandle<git_commit>> commits;
     commits.reserve(ids.size());
     for (const git_oid &id : ids)
@@ -152,14 +152,14 @@ void GitAdapter::createCommit(git_repository *repository, const ustring &message
     git_oid id{};
     // libgit2's parameter is not const throughout.
     auto parentPointers = parents;
-    retryWhileLocked(repository,
-                     [&]
-                     {
-                         return call(git_commit_create, &id, repository, "HEAD", signature.get(),
-                                     signature.get(), "UTF-8", text.c_str(), tree.get(),
-                                     parentPointers.size(), parentPointers.data());
-                     })
-        .value();
+    check(retryWhileLocked(repository,
+                           [&]
+                           {
+                               return call(git_commit_create, &id, repository, "HEAD",
+                                           signature.get(), signature.get(), "UTF-8", text.c_str(),
+                                           tree.get(), parentPointers.size(),
+                                           parentPointers.data());
+                           }));
     const GitResult<OwnedHandle<git_object>> written = lookUpWritten(repository, id);
     // The commit stands, even if its object can't be read just now.
     cleanUpRepositoryState(repository);

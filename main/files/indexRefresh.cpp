@@ -101,7 +101,7 @@ void restoreDropped(git_repository *repository, git_index *index, git_index *bef
         }
         if ((entry->flags_extended & GIT_INDEX_ENTRY_SKIP_WORKTREE) != 0)
         {
-            call(git_index_add, index, entry).value();
+            check(git_index_add, index, entry);
         }
         else
         {
@@ -115,7 +115,7 @@ void restoreDropped(git_repository *repository, git_index *index, git_index *bef
 void refreshIndex(git_repository *repository, git_index *index)
 {
     const std::size_t countBefore = git_index_entrycount(index);
-    call(git_index_update_all, index, nullptr, nullptr, nullptr).value();
+    check(git_index_update_all, index, nullptr, nullptr, nullptr);
     if (git_index_entrycount(index) < countBefore)
     {
         const OwnedHandle<git_index> before = openIndex(git_index_path(index));

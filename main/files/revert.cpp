@@ -137,7 +137,7 @@ void GitAdapter::revertFiles(const std::vector<upath> &files)
     git_checkout_options record = toGitCheckoutOptions(options, callbacks_->checkoutCallbacks());
     record.paths = getArray(pathspec);
     const CheckoutWatch watch(CheckoutKind::Revert, repository.get(), record);
-    call(git_checkout_index, repository.get(), nullptr, &record).value();
+    check(git_checkout_index, repository.get(), nullptr, &record);
     lock.publish();
 }
 

@@ -89,9 +89,8 @@ void GitAdapter::addToIndex(const std::vector<upath> &files)
     IndexLock lock(repository.get());
     const OwnedHandle<git_index> index = getRepositoryIndex(repository.get());
     const PathspecArray pathspec = makeFilePathspec(files, root_);
-    call(git_index_add_all, index.get(), getArrayPointer(pathspec), GIT_INDEX_ADD_DEFAULT,
-         acceptAllPaths, this)
-        .value();
+    check(git_index_add_all, index.get(), getArrayPointer(pathspec), GIT_INDEX_ADD_DEFAULT,
+          acceptAllPaths, this);
     writeIndex(index.get());
     lock.publish();
 }
@@ -107,8 +106,7 @@ void GitAdapter::removeFromIndex(const std::vector<upath> &files)
     IndexLock lock(repository.get());
     const OwnedHandle<git_index> index = getRepositoryIndex(repository.get());
     const PathspecArray pathspec = makeFilePathspec(files, root_);
-    call(git_index_remove_all, index.get(), getArrayPointer(pathspec), acceptAllPaths, this)
-        .value();
+    check(git_index_remove_all, index.get(), getArrayPointer(pathspec), acceptAllPaths, this);
     writeIndex(index.get());
     lock.publish();
 }

@@ -149,7 +149,7 @@ void BranchMerger::fastForward(git_repository *repository, git_annotated_commit 
     awaitUnlocked(repository, git_reference_name(head.get()));
     // As it was looked at: what comes later, libgit2 finds when it moves the branch.
     headThen.refuseMoved(repository);
-    call(git_checkout_tree, repository, target.get(), &record).value();
+    check(git_checkout_tree, repository, target.get(), &record);
     watch.settleSubmodules();
     lock.publish();
     // Only now, so that a checkout that fails leaves the branch where it was.

@@ -133,7 +133,7 @@ void BranchMerger::threeWayMerge(const BranchName &name, git_repository *reposit
     watch.lookBeforeMerge(git_annotated_commit_id(theirs));
     const MergeSides sides{readHeadId(repository), *git_annotated_commit_id(theirs)};
     marker.emplace(repository, sides);
-    call(git_merge, repository, heads, 1U, &mergeRecord, &checkoutRecord).value();
+    check(git_merge, repository, heads, 1U, &mergeRecord, &checkoutRecord);
     restoreMergeHead(repository, sides.theirs);
     watch.settleSubmodules();
     const OwnedHandle<git_index> index = getRepositoryIndex(repository);
@@ -170,7 +170,7 @@ void BranchMerger::endWithConflicts(git_repository *repository, git_index *index
         const PathspecArray pathspec = makeStringPathspec(makeExactPatterns(paths));
         copy.paths = getArray(pathspec);
         copy.checkout_strategy |= GIT_CHECKOUT_USE_OURS;
-        call(git_checkout_index, repository, nullptr, &copy).value();
+        check(git_checkout_index, repository, nullptr, &copy);
     }
     lock.publish();
     raise(shared_vclink::git::HasConflicts());

@@ -165,7 +165,7 @@ bool isNothingTaken(git_repository *repository, const git_commit *ours, const gi
     const OwnedHandle<git_index> index = getRepositoryIndex(repository);
     Search search{oursTree.get(), index.get()};
     git_diff_options options{};
-    call(git_diff_options_init, &options, unsigned{GIT_DIFF_OPTIONS_VERSION}).value();
+    check(git_diff_options_init, &options, unsigned{GIT_DIFF_OPTIONS_VERSION});
     options.notify_cb = lookAt;
     options.payload = &search;
     git_diff *raw = nullptr;

@@ -83,7 +83,7 @@ void BasicGitRemote::fetch(const std::vector<ustring> &refspecs)
     const OwnedHandle<git_remote> remote = lookupRemote(repository.get(), name);
     const FetchOptions options = optionsFactory_->makeFetchOptions();
     const git_fetch_options record = toGitFetchOptions(options, *callbacks_);
-    call(git_remote_fetch, remote.get(), getArrayPointer(array), &record, nullptr).value();
+    check(git_remote_fetch, remote.get(), getArrayPointer(array), &record, nullptr);
 }
 
 void BasicGitRemote::push(const std::vector<ustring> &refspecs)
@@ -95,7 +95,7 @@ void BasicGitRemote::push(const std::vector<ustring> &refspecs)
     const OwnedHandle<git_remote> remote = lookupRemote(repository.get(), name);
     const PushOptions options = optionsFactory_->makePushOptions();
     const git_push_options record = toGitPushOptions(options, *callbacks_);
-    call(git_remote_push, remote.get(), getArrayPointer(array), &record).value();
+    check(git_remote_push, remote.get(), getArrayPointer(array), &record);
 }
 
 std::vector<GitRemoteHead> BasicGitRemote::getRemoteHeads() const
@@ -107,8 +107,7 @@ std::vector<GitRemoteHead> BasicGitRemote::getRemoteHeads() const
     const ProxyOptions options = optionsFactory_->makeProxyOptions();
     const git_remote_callbacks callbacks = toGitRemoteCallbacks(callbacks_->remoteCallbacks());
     const git_proxy_options proxy = toGitProxyOptions(options, callbacks_->proxyCallbacks());
-    call(git_remote_connect, remote.get(), GIT_DIRECTION_FETCH, &callbacks, &proxy, nullptr)
-        .value();
+    check(git_remote_connect, remote.get(), GIT_DIRECTION_FETCH, &callbacks, &proxy, nullptr);
     return listHeads(remote.get());
 }
 

@@ -128,8 +128,8 @@ IndexLock::IndexLock(git_repository *repository)
     : held_(std::make_unique<Held>(findIndex(repository)))
 {
     const OwnedHandle<git_index> index = openIndex(held_->copy.path().c_str());
-    call(git_repository_set_index, repository, index.get()).value();
-    call(git_index_set_caps, index.get(), GIT_INDEX_CAPABILITY_FROM_OWNER).value();
+    check(git_repository_set_index, repository, index.get());
+    check(git_index_set_caps, index.get(), GIT_INDEX_CAPABILITY_FROM_OWNER);
 }
 
 IndexLock::~IndexLock()

@@ -53,7 +53,7 @@ ReferenceLockWait::ReferenceLockWait(milliseconds timeout)
 
 void awaitUnlocked(git_repository *repository, const char *reference)
 {
-    retryWhileLocked(
+    check(retryWhileLocked(
         repository,
         [=]() -> GitResult<void>
         {
@@ -63,8 +63,7 @@ void awaitUnlocked(git_repository *repository, const char *reference)
             const std::unique_ptr<git_transaction, void (*)(git_transaction *)> transaction(
                 raw, git_transaction_free);
             return made.has_error() ? made : call(git_transaction_lock_ref, raw, reference);
-        })
-        .value();
+        }));
 }
 
 bool ReferenceLockWait::pause()

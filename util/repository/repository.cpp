@@ -27,7 +27,7 @@ void readAgainIfEmpty(git_index *index)
     struct stat status = {};
     if (::stat(path, &status) == 0)
     {
-        call(git_index_read, index, 1).value();
+        check(git_index_read, index, 1);
     }
     else if (errno != ENOENT)
     {
@@ -85,11 +85,11 @@ int readRepositoryState(git_repository *repository)
 
 void cleanUpRepositoryState(git_repository *repository)
 {
-    call(git_repository_state_cleanup, repository).value();
+    check(git_repository_state_cleanup, repository);
     // The next commit would be one of the same merge.
     if (hasMergeHead(repository))
     {
-        call(git_repository_state_cleanup, repository).value();
+        check(git_repository_state_cleanup, repository);
     }
 }
 
@@ -109,13 +109,13 @@ OwnedHandle<git_index> openIndex(const char *path)
 
 void writeIndex(git_index *index)
 {
-    call(git_index_write, index).value();
+    check(git_index_write, index);
 }
 
 git_oid writeIndexTree(git_index *index)
 {
     git_oid id{};
-    call(git_index_write_tree, &id, index).value();
+    check(git_index_write_tree, &id, index);
     return id;
 }
 
@@ -143,7 +143,7 @@ const git_oid *revparseId(const std::string &spec, git_repository *repository)
 git_oid readHeadId(git_repository *repository)
 {
     git_oid id{};
-    call(git_reference_name_to_id, &id, repository, "HEAD").value();
+    check(git_reference_name_to_id, &id, repository, "HEAD");
     return id;
 }
 
