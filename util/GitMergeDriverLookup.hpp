@@ -19,7 +19,7 @@ class GitMergeDriverLookup : public std::map<std::string, git_merge_driver>
 /// Registers the one driver, under "*": libgit2 calls it for every name in a `merge` attribute that
 /// it knows no driver for. A driver that is registered already, by another guard, stays.
 /// git_merge_driver_register, whose result is not looked at.
-GitMergeDriverLookup registerMergeDrivers();
+[[nodiscard]] GitMergeDriverLookup registerMergeDrivers();
 
 /// Unregisters every driver of the lookup, for the whole process, also when another guard has
 /// registered it. git_merge_driver_unregister, whose result is not looked at.

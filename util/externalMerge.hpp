@@ -48,7 +48,7 @@ struct MergedFile
 /// @return 0, or GIT_EMERGECONFLICT when the command does not succeed
 /// @throws LibGit2Exception when a blob can't be read or the content not be handed over, and what
 /// runCommand() raises
-int runExternalMerge(const std::string &command, const FileVersions &sides,
-                     git_repository *repository, const MergedFile &merged);
+[[nodiscard]] int runExternalMerge(const std::string &command, const FileVersions &sides,
+                                   git_repository *repository, const MergedFile &merged);
 
 } // namespace vclink::git

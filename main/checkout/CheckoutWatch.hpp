@@ -48,7 +48,8 @@ class CheckoutWatch
     /// @param repository outlives the watch
     /// @param record outlives the watch; its notification is taken over, and its baseline set by
     /// the look before
-    CheckoutWatch(CheckoutKind kind, git_repository *repository, git_checkout_options &record);
+    [[nodiscard]] CheckoutWatch(CheckoutKind kind, git_repository *repository,
+                                git_checkout_options &record);
     CheckoutWatch(const CheckoutWatch &) = delete;
     CheckoutWatch &operator=(const CheckoutWatch &) = delete;
     ~CheckoutWatch() = default;

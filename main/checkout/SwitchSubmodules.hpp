@@ -33,7 +33,7 @@ class SwitchSubmodules
     /// An index in memory for the checkout's `baseline_index`. git_index_new, git_index_read_tree,
     /// git_index_remove, git_index_add.
     /// @throws LibGit2Exception
-    OwnedHandle<git_index> makeBaseline(const WorkingCopy &copy) const;
+    [[nodiscard]] OwnedHandle<git_index> makeBaseline(const WorkingCopy &copy) const;
 
     /// Brings the index, in memory, to what the target has. git_index_remove, git_index_add.
     /// @throws LibGit2Exception

@@ -30,7 +30,7 @@ class WorkingCopy
         return head_.get();
     }
     /// Whether HEAD is no longer what it was then.
-    bool hasHeadMoved() const;
+    [[nodiscard]] bool hasHeadMoved() const;
     git_index *index() const noexcept
     {
         return index_.get();

@@ -12,7 +12,7 @@ namespace vclink::git
 /// configured, makeFallbackSignature(). git_signature_default.
 /// @throws LibGit2Exception when the configuration can't be read or names nobody, and what
 /// makeFallbackSignature raises
-OwnedHandle<git_signature> makeSignature(git_repository *repository);
+[[nodiscard]] OwnedHandle<git_signature> makeSignature(git_repository *repository);
 
 /// An identity made from the environment and the machine's name: "USER", or "LOGNAME" where that
 /// one is unset, and that name, "@" and the host's name as the address. git_signature_now. Reads
@@ -20,6 +20,6 @@ OwnedHandle<git_signature> makeSignature(git_repository *repository);
 /// @throws the exception of shared_vclink::git::NoUserName when both variables are unset
 /// @throws boost::system::system_error when the host's name can't be found out
 /// @throws LibGit2Exception when libgit2 refuses the values, e.g. an empty name
-OwnedHandle<git_signature> makeFallbackSignature();
+[[nodiscard]] OwnedHandle<git_signature> makeFallbackSignature();
 
 } // namespace vclink::git

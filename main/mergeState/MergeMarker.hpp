@@ -19,7 +19,7 @@ class MergeMarker
     /// To be made while the index is locked and no merge is under way: what is left of an earlier
     /// merge goes.
     /// @throws LibGit2Exception if the file can't be written
-    MergeMarker(git_repository *repository, const MergeSides &sides);
+    [[nodiscard]] MergeMarker(git_repository *repository, const MergeSides &sides);
     MergeMarker(const MergeMarker &) = delete;
     MergeMarker &operator=(const MergeMarker &) = delete;
     ~MergeMarker();
@@ -31,7 +31,7 @@ class MergeMarker
 /// Whether a merge of `theirs` has been cut short in this repository, wherever HEAD was then: what
 /// is left of the merge outlives a switch of the branch. A marker that was itself cut short counts.
 /// @throws LibGit2Exception if that can't be found out
-bool hasMergeMarker(git_repository *repository, const git_oid &theirs);
+[[nodiscard]] bool hasMergeMarker(git_repository *repository, const git_oid &theirs);
 
 /// Removes the marker of a merge that is over. To be called while the index is locked and no merge
 /// is under way.

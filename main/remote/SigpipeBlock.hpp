@@ -16,7 +16,7 @@ namespace vclink::git
 class SigpipeBlock
 {
   public:
-    SigpipeBlock() noexcept;
+    [[nodiscard]] SigpipeBlock() noexcept;
     SigpipeBlock(const SigpipeBlock &) = delete;
     SigpipeBlock &operator=(const SigpipeBlock &) = delete;
     /// Takes a signal away that came in between, one that was pending before staying, and gives the

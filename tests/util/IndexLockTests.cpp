@@ -178,7 +178,7 @@ TEST_F(IndexLockTest, IsRefusedWhereAnotherStands)
 {
     repository_.write(".git/index.lock", "of another process");
     const auto opened = open(repository_);
-    const git::GitError error = lockErrorOf([&] { IndexLock(opened.get()); });
+    const git::GitError error = lockErrorOf([&] { static_cast<void>(IndexLock(opened.get())); });
     EXPECT_EQ(error.getCode(), GIT_ELOCKED);
     EXPECT_EQ(error.getErrorClass(), GIT_ERROR_INDEX);
     EXPECT_EQ(vclink::test::asUtf8(error.getMessage()),
@@ -193,7 +193,8 @@ TEST_F(IndexLockTest, IsRefusedWhileThisProcessHoldsIt)
     const auto opened = open(repository_);
     const IndexLock lock(opened.get());
     const auto second = open(repository_);
-    EXPECT_EQ(lockErrorOf([&] { IndexLock(second.get()); }).getCode(), GIT_ELOCKED);
+    EXPECT_EQ(lockErrorOf([&] { static_cast<void>(IndexLock(second.get())); }).getCode(),
+              GIT_ELOCKED);
     EXPECT_THAT(indexFiles(), UnorderedElementsAre("index", "index.lock", "index.vclink"));
 }
 
@@ -333,7 +334,8 @@ TEST_F(IndexLockTest, EndsAtALinkThatLeadsToItself)
     const auto opened = open(repository_);
     repository_.remove(".git/index");
     repository_.symlink("index", ".git/index");
-    EXPECT_THAT(vclink::test::asUtf8(lockErrorOf([&] { IndexLock(opened.get()); }).getMessage()),
+    EXPECT_THAT(vclink::test::asUtf8(
+                    lockErrorOf([&] { static_cast<void>(IndexLock(opened.get())); }).getMessage()),
                 HasSubstr("Too many levels of symbolic links"));
     EXPECT_THAT(indexFiles(), ElementsAre("index"));
 }
@@ -352,7 +354,7 @@ TEST_F(IndexLockTest, TakesNoNoticeOfWhatAKilledProcessLeft)
     repository_.write(".git/index.vclink", "half of an index");
     repository_.remove(".git/index");
     const auto fresh = open(repository_);
-    EXPECT_EQ(lockErrorOf([&] { IndexLock(fresh.get()); }).getCode(), 0);
+    EXPECT_EQ(lockErrorOf([&] { static_cast<void>(IndexLock(fresh.get())); }).getCode(), 0);
     EXPECT_THAT(indexFiles(), ElementsAre());
 }
 
@@ -361,7 +363,8 @@ TEST_F(IndexLockTest, IsGivenUpWhereTheIndexCannotBeRead)
     const std::string broken = "this is no index, and long enough to be told from an empty one";
     repository_.write(".git/index", broken);
     const auto opened = open(repository_);
-    EXPECT_EQ(lockErrorOf([&] { IndexLock(opened.get()); }).getErrorClass(), GIT_ERROR_INDEX);
+    EXPECT_EQ(lockErrorOf([&] { static_cast<void>(IndexLock(opened.get())); }).getErrorClass(),
+              GIT_ERROR_INDEX);
     EXPECT_THAT(indexFiles(), ElementsAre("index"));
     EXPECT_EQ(repository_.read(".git/index"), broken);
 }
@@ -374,7 +377,7 @@ TEST_F(IndexLockTest, IsGivenUpWhereTheIndexMayNotBeRead)
         [&]
         {
             const auto opened = open(repository_);
-            const auto error = lockErrorOf([&] { IndexLock(opened.get()); });
+            const auto error = lockErrorOf([&] { static_cast<void>(IndexLock(opened.get())); });
             return vclink::test::asUtf8(error.getMessage());
         });
     EXPECT_EQ(text, "failed to read index: '" + (repository_ / ".git/index").string() +
@@ -424,7 +427,7 @@ TEST_F(IndexLockTest, LeavesNoDescriptorOpenAndHandsNoneOn)
         }
     }
     repository_.write(".git/index", "no index");
-    lockErrorOf([&] { IndexLock(opened.get()); });
+    lockErrorOf([&] { static_cast<void>(IndexLock(opened.get())); });
 }
 
 } // namespace

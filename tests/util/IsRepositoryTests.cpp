@@ -67,7 +67,8 @@ TEST_F(IsRepository, IsTrueForARepositoryThatCannotBeOpened)
     const auto repository = makeRepository();
     repository.write(".git/config", "[core\n");
     EXPECT_TRUE(isRepository(asPath(repository.path())));
-    EXPECT_THROW(vclink::git::openRepository(asPath(repository.path())), LibGit2Exception);
+    EXPECT_THROW(static_cast<void>(vclink::git::openRepository(asPath(repository.path()))),
+                 LibGit2Exception);
 }
 
 TEST_F(IsRepository, LeavesNoDescriptorOpen)

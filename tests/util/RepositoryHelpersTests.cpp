@@ -61,7 +61,8 @@ TEST_F(RepositoryHelpers, OpenNothingAboveTheFolder)
 {
     const auto repository = makeRepository();
     repository.makeFolder("sub");
-    const auto error = raisedBy([&] { git::openRepository(asPath(repository / "sub")); });
+    const auto error =
+        raisedBy([&] { static_cast<void>(git::openRepository(asPath(repository / "sub"))); });
     EXPECT_EQ(error.getCode(), GIT_ENOTFOUND);
     EXPECT_EQ(error.getErrorClass(), GIT_ERROR_REPOSITORY);
     EXPECT_NE(vclink::test::asUtf8(error.getMessage()).find("could not find repository"),
@@ -76,8 +77,10 @@ TEST_F(RepositoryHelpers, OpenANewHandleEachTimeAndCloseIt)
     const auto first = open(repository);
     const auto second = open(repository);
     EXPECT_NE(first.get(), second.get());
-    EXPECT_EQ(raisedBy([&] { git::openRepository(asPath(folder() / "missing")); }).getCode(),
-              GIT_ENOTFOUND);
+    EXPECT_EQ(
+        raisedBy([&] { static_cast<void>(git::openRepository(asPath(folder() / "missing"))); })
+            .getCode(),
+        GIT_ENOTFOUND);
 }
 
 TEST_F(RepositoryHelpers, GetTheIndex)
@@ -97,7 +100,7 @@ TEST_F(RepositoryHelpers, RaiseForAnIndexThatCannotBeRead)
     repository.write(".git/index",
                      "this is no index, and long enough to be told from an empty one");
     const auto opened = open(repository);
-    const auto error = raisedBy([&] { git::getRepositoryIndex(opened.get()); });
+    const auto error = raisedBy([&] { static_cast<void>(git::getRepositoryIndex(opened.get())); });
     EXPECT_EQ(error.getCode(), GIT_ERROR);
     EXPECT_EQ(error.getErrorClass(), GIT_ERROR_INDEX);
 }
@@ -179,10 +182,13 @@ TEST_F(RepositoryHelpers, RaiseForAnIdThatIsNoTree)
     git_oid id;
     ASSERT_EQ(git_oid_fromstr(&id, repository.commit("first").c_str()), 0);
     const auto opened = open(repository);
-    EXPECT_EQ(raisedBy([&] { git::lookupTree(opened.get(), &id); }).getCode(), GIT_ENOTFOUND);
+    EXPECT_EQ(raisedBy([&] { static_cast<void>(git::lookupTree(opened.get(), &id)); }).getCode(),
+              GIT_ENOTFOUND);
     git_oid missing;
     ASSERT_EQ(git_oid_fromstr(&missing, std::string(40, '1').c_str()), 0);
-    EXPECT_EQ(raisedBy([&] { git::lookupTree(opened.get(), &missing); }).getCode(), GIT_ENOTFOUND);
+    EXPECT_EQ(
+        raisedBy([&] { static_cast<void>(git::lookupTree(opened.get(), &missing)); }).getCode(),
+        GIT_ENOTFOUND);
 }
 
 } // namespace

@@ -112,7 +112,8 @@ TEST_F(RunCommandFailure, OfAnEmptyCommandIsAnError)
 TEST_F(RunCommandFailure, OfACommandThatPlaceholdersEmptyIsAnError)
 {
     const NothingLeft check(environment().temporary());
-    EXPECT_THROW(runCommand("%A%B", {{"%A", ""}, {"%B", " "}}), boost::process::process_error);
+    EXPECT_THROW(static_cast<void>(runCommand("%A%B", {{"%A", ""}, {"%B", " "}})),
+                 boost::process::process_error);
 }
 
 TEST_F(RunCommandFailure, OfALoneQuoteIsAnError)
@@ -130,7 +131,7 @@ TEST_F(RunCommandFailure, OfAnEmptyEnvironmentIsAnError)
         environ = none.data();
         try
         {
-            runCommand(command, {});
+            static_cast<void>(runCommand(command, {}));
         }
         catch (const boost::process::process_error &error)
         {
@@ -146,7 +147,8 @@ TEST_F(RunCommandFailure, LeavesNothingHoweverOftenItHappens)
 {
     const NothingLeft check(environment().temporary());
     for (int i = 0; i < 50; ++i)
-        EXPECT_THROW(runCommand("/nowhere/tool", {}), boost::process::process_error);
+        EXPECT_THROW(static_cast<void>(runCommand("/nowhere/tool", {})),
+                     boost::process::process_error);
 }
 
 TEST_F(RunCommandFailure, LeavesTheOtherChildrenOfTheProcess)
@@ -156,7 +158,7 @@ TEST_F(RunCommandFailure, LeavesTheOtherChildrenOfTheProcess)
         ::_exit(9);
     siginfo_t info = {};
     ASSERT_EQ(::waitid(P_PID, static_cast<id_t>(child), &info, WEXITED | WNOWAIT), 0);
-    EXPECT_THROW(runCommand("/nowhere/tool", {}), boost::process::process_error);
+    EXPECT_THROW(static_cast<void>(runCommand("/nowhere/tool", {})), boost::process::process_error);
     EXPECT_EQ(runCommand("/bin/true", {}), 0);
     int status = 0;
     EXPECT_EQ(::waitpid(child, &status, WNOHANG), child);
@@ -175,7 +177,7 @@ std::string runWithoutAnotherProcess()
     ::setrlimit(RLIMIT_NPROC, &none);
     try
     {
-        runCommand("/bin/true", {});
+        static_cast<void>(runCommand("/bin/true", {}));
         return "nothing was raised";
     }
     catch (const boost::process::process_error &error)
@@ -199,7 +201,7 @@ TEST_F(RunCommandFailure, OfThePipeIsAnErrorWithoutARecord)
     try
     {
         const DescriptorLimit none(0);
-        runCommand("/bin/true", {});
+        static_cast<void>(runCommand("/bin/true", {}));
     }
     catch (...)
     {
@@ -230,7 +232,7 @@ TEST_F(RunCommandFailure, OfThePipesMoveNamesTheCall)
         ::close(STDOUT_FILENO);
         try
         {
-            runCommand("/bin/true", {});
+            static_cast<void>(runCommand("/bin/true", {}));
         }
         catch (const boost::process::process_error &error)
         {
@@ -278,7 +280,7 @@ TEST_F(RunCommandFailure, EndsACommandThatAnExceptionLeaves)
                 if (record.message.compare(0, 8, "Output:\n") == 0)
                     throw std::domain_error("sink");
             });
-        EXPECT_THROW(runCommand(program, {}), std::domain_error);
+        EXPECT_THROW(static_cast<void>(runCommand(program, {})), std::domain_error);
     }
     const std::string process = vclink::test::Scripts::read(identity);
     ASSERT_FALSE(process.empty());
@@ -293,7 +295,7 @@ TEST_F(RunCommandFailure, StartsNothingWhenTheRecordOfTheCommandFails)
     const std::string program = scripts_.shell("echo started >" + mark);
     vclink::test::LogCapture log(0x08);
     log.onRecord([](const vclink::test::LogRecord &) { throw std::domain_error("sink"); });
-    EXPECT_THROW(runCommand(program, {}), std::domain_error);
+    EXPECT_THROW(static_cast<void>(runCommand(program, {})), std::domain_error);
     EXPECT_EQ(vclink::test::Scripts::read(mark), "");
 }
 

@@ -72,7 +72,8 @@ TEST_F(RunCommandHost, ThatBeginsToIgnoreItsChildrenMeanwhileGetsAnError)
                 ::signal(SIGCHLD, SIG_IGN);
                 ::close(end);
             });
-        EXPECT_THROW(runCommand(program, {}), boost::process::process_error) << status;
+        EXPECT_THROW(static_cast<void>(runCommand(program, {})), boost::process::process_error)
+            << status;
         other.join();
     }
 }
@@ -266,7 +267,7 @@ TEST_F(RunCommandHost, MayFailToStartCommandsOnManyThreads)
                                          {
                                              try
                                              {
-                                                 runCommand("/nowhere/tool", {});
+                                                 static_cast<void>(runCommand("/nowhere/tool", {}));
                                              }
                                              catch (const boost::process::process_error &)
                                              {

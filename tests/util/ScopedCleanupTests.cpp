@@ -40,8 +40,8 @@ TEST(ScopedCleanup, RunsItsFunctionWhenAnExceptionPasses)
 
 TEST(ScopedCleanup, SwallowsWhatItsFunctionRaises)
 {
-    EXPECT_NO_THROW(ScopedCleanup([] { throw std::runtime_error("cleanup"); }));
-    EXPECT_NO_THROW(ScopedCleanup([] { throw 7; }));
+    EXPECT_NO_THROW(static_cast<void>(ScopedCleanup([] { throw std::runtime_error("cleanup"); })));
+    EXPECT_NO_THROW(static_cast<void>(ScopedCleanup([] { throw 7; })));
 }
 
 TEST(ScopedCleanup, KeepsThePassingExceptionWhenItsFunctionRaises)
@@ -56,9 +56,9 @@ TEST(ScopedCleanup, KeepsThePassingExceptionWhenItsFunctionRaises)
 
 TEST(ScopedCleanup, DoesNothingWithoutAFunction)
 {
-    EXPECT_NO_THROW(ScopedCleanup());
-    EXPECT_NO_THROW(ScopedCleanup(std::function<void()>()));
-    EXPECT_NO_THROW(ScopedCleanup(nullptr));
+    EXPECT_NO_THROW(static_cast<void>(ScopedCleanup()));
+    EXPECT_NO_THROW(static_cast<void>(ScopedCleanup(std::function<void()>())));
+    EXPECT_NO_THROW(static_cast<void>(ScopedCleanup(nullptr)));
 }
 
 TEST(ScopedCleanup, DestroysItsFunctionAfterTheRun)

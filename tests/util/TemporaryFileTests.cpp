@@ -113,7 +113,7 @@ TEST_F(TemporaryFile, IsNotMadeForABlobThatIsMissing)
     git_oid_fromstr(&entry.id, std::string(40, '1').c_str());
     try
     {
-        git::writeBlobToTemporaryFile(entry, opened.get());
+        static_cast<void>(git::writeBlobToTemporaryFile(entry, opened.get()));
         FAIL() << "no exception";
     }
     catch (const git::LibGit2Exception &exception)

@@ -10,7 +10,7 @@ namespace vclink::git
 
 /// Whether the system keeps the status of a child that ends. It does not while the process ignores
 /// SIGCHLD.
-bool isChildStatusKept() noexcept;
+[[nodiscard]] bool isChildStatusKept() noexcept;
 
 /// Learns how a child ended, and leaves it for its owner to wait for. A status that somebody else
 /// in the process has taken is an error, and never looks like success.

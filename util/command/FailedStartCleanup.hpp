@@ -19,7 +19,7 @@ class FailedStartCleanup
   public:
     /// @param source, sink the pipe's two ends, open
     /// @throws std::bad_alloc
-    FailedStartCleanup(int source, int sink);
+    [[nodiscard]] FailedStartCleanup(int source, int sink);
     FailedStartCleanup(const FailedStartCleanup &) = delete;
     FailedStartCleanup &operator=(const FailedStartCleanup &) = delete;
     ~FailedStartCleanup();

@@ -17,7 +17,7 @@ std::string expandPlaceholders(const std::string &commandTemplate,
 /// What makes a command impossible to hand to Boost.Process, which would crash or read beyond its
 /// words: no word at all, a lone double quote as the last word, an empty environment.
 /// @return the fault in words; null when there is none
-const char *findCommandFault(const std::string &command) noexcept;
+[[nodiscard]] const char *findCommandFault(const std::string &command) noexcept;
 
 /// One word of a command: its place, and what Boost.Process makes of it.
 struct CommandWord

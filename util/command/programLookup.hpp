@@ -15,6 +15,6 @@ namespace vclink::git
 /// @return the command, unchanged unless Boost.Process would take another file: then with the
 /// program's path in place of its name
 /// @throws std::bad_alloc
-std::string nameProgram(const std::string &command, std::error_code &error);
+[[nodiscard]] std::string nameProgram(const std::string &command, std::error_code &error);
 
 } // namespace vclink::git

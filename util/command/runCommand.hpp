@@ -16,7 +16,7 @@ namespace vclink::git
 /// @return the exit status, or the number of the signal that ended the command
 /// @throws boost::process::process_error when the command can't be started or watched, or its
 /// status can't be known: nothing is left behind then
-int runCommand(const std::string &commandTemplate,
-               const std::map<std::string, std::string> &placeholders);
+[[nodiscard]] int runCommand(const std::string &commandTemplate,
+                             const std::map<std::string, std::string> &placeholders);
 
 } // namespace vclink::git

@@ -22,7 +22,7 @@ class IndexCopy
     /// Removes an earlier copy that a killed operation has left.
     /// @param index its path, no symbolic link
     /// @throws LibGit2Exception if the file can't be read or copied; there is no copy then
-    explicit IndexCopy(const std::string &index);
+    [[nodiscard]] explicit IndexCopy(const std::string &index);
     IndexCopy(const IndexCopy &) = delete;
     IndexCopy &operator=(const IndexCopy &) = delete;
     /// Removes the copy if it is still there.
@@ -35,7 +35,7 @@ class IndexCopy
 
     /// Puts the copy in the index's place, in one step, if libgit2 has written it.
     /// @return 0, or the errno of the call that failed
-    int replaceIndex() const noexcept;
+    [[nodiscard]] int replaceIndex() const noexcept;
 
   private:
     IndexCopy(std::string index, std::string path);

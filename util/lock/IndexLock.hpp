@@ -23,7 +23,7 @@ class IndexLock
     /// @param repository outlives the object; must not use its index after publish()
     /// @throws LibGit2Exception with the code GIT_ELOCKED and the name of the lock file if
     /// something else holds the lock; nothing has changed then
-    explicit IndexLock(git_repository *repository);
+    [[nodiscard]] explicit IndexLock(git_repository *repository);
     IndexLock(const IndexLock &) = delete;
     IndexLock &operator=(const IndexLock &) = delete;
     /// Puts what libgit2 wrote in place and gives the lock up, so that what was written before a

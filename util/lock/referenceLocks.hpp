@@ -26,7 +26,7 @@ class ReferenceLockWait
 
     /// Pauses before the next try. The last one comes when the time is over.
     /// @return false, at once, when there is none
-    bool pause();
+    [[nodiscard]] bool pause();
 
   private:
     std::chrono::steady_clock::time_point end_;

@@ -24,7 +24,7 @@ class Head
 
     /// git_repository_head.
     /// @throws LibGit2Exception if HEAD cannot be read
-    bool hasMoved(git_repository *repository) const;
+    [[nodiscard]] bool hasMoved(git_repository *repository) const;
     /// @throws LibGit2Exception if it has moved: with the code GIT_EMODIFIED, the class
     /// GIT_ERROR_REFERENCE and movedText
     void refuseMoved(git_repository *repository) const;
@@ -39,6 +39,6 @@ class Head
 
 /// What HEAD resolves to, null on an unborn branch. git_repository_head.
 /// @throws LibGit2Exception
-OwnedHandle<git_reference> lookupHead(git_repository *repository);
+[[nodiscard]] OwnedHandle<git_reference> lookupHead(git_repository *repository);
 
 } // namespace vclink::git

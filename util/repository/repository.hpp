@@ -20,7 +20,7 @@ namespace vclink::git
 bool isRepository(const upath &path);
 
 /// Opens the repository of exactly this folder. git_repository_open_ext. Raises.
-OwnedHandle<git_repository> openRepository(const upath &root);
+[[nodiscard]] OwnedHandle<git_repository> openRepository(const upath &root);
 
 /// What is under way, a number of git_repository_state_t. git_repository_state, and once more where
 /// it says that nothing is and MERGE_HEAD stands. Raises when that can't be looked at.
@@ -30,11 +30,11 @@ int readRepositoryState(git_repository *repository);
 void cleanUpRepositoryState(git_repository *repository);
 
 /// git_repository_index, and for an empty index git_index_read, to be sure. Raises.
-OwnedHandle<git_index> getRepositoryIndex(git_repository *repository);
+[[nodiscard]] OwnedHandle<git_index> getRepositoryIndex(git_repository *repository);
 
 /// git_index_open, and for an empty index git_index_read, to be sure: what this file holds,
 /// whatever the repository's index has come to in memory. Raises.
-OwnedHandle<git_index> openIndex(const char *path);
+[[nodiscard]] OwnedHandle<git_index> openIndex(const char *path);
 
 /// git_index_write. Raises; the index on disk is as it was then.
 void writeIndex(git_index *index);
@@ -43,7 +43,7 @@ void writeIndex(git_index *index);
 git_oid writeIndexTree(git_index *index);
 
 /// git_tree_lookup. Raises.
-OwnedHandle<git_tree> lookupTree(git_repository *repository, const git_oid *id);
+[[nodiscard]] OwnedHandle<git_tree> lookupTree(git_repository *repository, const git_oid *id);
 
 /// The object that a revision text names. git_revparse_single. Keeps a failure.
 GitResult<OwnedHandle<git_object>> revparseObject(git_repository *repository,

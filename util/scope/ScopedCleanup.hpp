@@ -13,7 +13,8 @@ class ScopedCleanup
 {
   public:
     ScopedCleanup() = default;
-    explicit ScopedCleanup(std::function<void()> cleanup) : cleanup_(std::move(cleanup))
+    [[nodiscard]] explicit ScopedCleanup(std::function<void()> cleanup)
+        : cleanup_(std::move(cleanup))
     {
     }
     ScopedCleanup(const ScopedCleanup &) = delete;
