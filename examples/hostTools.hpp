@@ -159,7 +159,8 @@ inline std::vector<upath> filesInConflict(vclink::CMAdapter &adapter)
 // ---- Progress.
 
 /// Passes reports on at most once in an interval, as a checkout makes two for each file. The first
-/// report and the end always pass. Called on the thread of the operation, and so is `show`.
+/// report, which has no message yet, and the end always pass. Called on the thread of the
+/// operation, and so is `show`.
 class ThrottledProgress : public vclink::ProgressReporter
 {
   public:
@@ -260,7 +261,8 @@ struct Failure
     FailureKind kind = FailureKind::Other;
     /// e.g. "shared_vclink:git:AlreadyAdded"; empty for exceptions without a message identifier
     std::string id;
-    /// For the user, in the locale that was current when the failure was described.
+    /// For the user, in the locale that was current when the failure was described; of the kinds
+    /// Cancelled and Other what(), in English. Those of AlreadyAdded and Conflicted list the files.
     ustring text;
     /// One path a line, where the kind has files.
     ustring files;

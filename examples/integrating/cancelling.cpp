@@ -37,7 +37,9 @@ class CancellableSwitch
     /// On the window's thread.
     void cancel()
     {
-        vclink_host::requestCancellation(interactor_->getTerminator());
+        // A request that comes later would have no effect on this operation.
+        if (canCancel())
+            vclink_host::requestCancellation(interactor_->getTerminator());
     }
 
   private:

@@ -39,12 +39,13 @@ namespace vclink::git
 /// @section adapter_getFileStates getFileStates
 /// Returns the states of the files named, in one walk for the whole list. A file that Git ignores,
 /// or that neither the disk nor Git has, is not in the result. An empty list gives an empty
-/// map and opens nothing. If the walk fails on its way, the result holds the states found so far;
-/// nothing is thrown. It is empty for a bare repository. git_status_foreach_ext.
+/// map and opens nothing. If libgit2 cannot read the working copy, the result is empty, as it is
+/// for a bare repository; nothing is thrown. libgit2 reads all of it before it reports the first
+/// state, so that states are missing from a result only if memory runs out. git_status_foreach_ext.
 ///
 /// @section adapter_getFolderStates getFolderStates
-/// Returns the states of all files below a folder, without ignored ones. A walk that fails ends as
-/// in getFileStates. git_status_foreach_ext.
+/// Returns the states of all files below a folder, without ignored ones. A working copy that
+/// cannot be read gives an empty result, as in getFileStates. git_status_foreach_ext.
 ///
 /// @section adapter_addFiles addFiles
 /// Begins to track unversioned files. Throws the exception of shared_vclink::git::AlreadyAdded,
