@@ -1,8 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "main/files/StatusCallbacks.hpp"
 
-#include <git2/status.h>
-
+#include "main/files/mapStatusFlags.hpp"
 #include "util/path/paths.hpp"
 
 namespace vclink::git
@@ -25,39 +24,6 @@ int StatusCallbacks::status(const char *path, unsigned int flags)
     states.emplace_hint(states.end(), joinRepositoryPath(root, path, nameBuffer_),
                         FileState(mapStatusFlags(flags & statusWord)));
     return 0;
-}
-
-FileState::State mapStatusFlags(unsigned int flags) noexcept
-{
-    if (flags == GIT_STATUS_CURRENT)
-    {
-        return FileState::Clean;
-    }
-    if ((flags & GIT_STATUS_CONFLICTED) != 0)
-    {
-        return FileState::InConflict;
-    }
-    if ((flags & GIT_STATUS_INDEX_NEW) != 0)
-    {
-        return FileState::Added;
-    }
-    if ((flags & (GIT_STATUS_INDEX_MODIFIED | GIT_STATUS_WT_MODIFIED)) != 0)
-    {
-        return FileState::Modified;
-    }
-    if ((flags & GIT_STATUS_INDEX_DELETED) != 0)
-    {
-        return FileState::Deleted;
-    }
-    if ((flags & GIT_STATUS_WT_NEW) != 0)
-    {
-        return FileState::Unversioned;
-    }
-    if ((flags & GIT_STATUS_WT_DELETED) != 0)
-    {
-        return FileState::Missing;
-    }
-    return FileState::Unknown;
 }
 
 } // namespace vclink::git

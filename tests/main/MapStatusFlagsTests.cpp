@@ -6,7 +6,7 @@
 #include <git2.h>
 #include <gtest/gtest.h>
 
-#include "main/files/StatusCallbacks.hpp"
+#include "main/files/mapStatusFlags.hpp"
 #include "vclink/FileState.hpp"
 
 namespace
