@@ -139,20 +139,20 @@ int runCommand(const std::string &commandTemplate,
     process::ipstream output(makePipe());
     writeRecord(SeverityDiagnostic, "Command: ", command);
     const std::string usable = makeUsable(command);
-    FailedStartCleanup guard(output.pipe().native_source(), output.pipe().native_sink());
+    FailedStartCleanup cleanup(output.pipe().native_source(), output.pipe().native_sink());
     process::child child(usable, process::std_out > output, process::std_err > process::null,
                          boost::this_process::environment());
     // Where the process can't be forked, Boost.Process raises nothing and gives no child, whose
     // number would mean every child of the process.
     raiseIfError(child.valid() ? std::error_code() : lastError(), "fork(2) failed");
-    guard.hasStarted(child.id());
+    cleanup.hasStarted(child.id());
     ChildStatus status(child.id());
     writeRecord(SeverityDiagnostic, "Output:\n", readOutput(output, status));
     const int result = waitFor(status);
     // Another waiter in the process may have been faster; the status is known.
     std::error_code ignored;
     child.wait(ignored);
-    guard.hasEnded();
+    cleanup.hasEnded();
     return result;
 }
 
