@@ -8,7 +8,9 @@
 
 #include <git2/commit.h>
 #include <git2/errors.h>
+#include <git2/repository.h>
 #include <git2/tree.h>
+#include <sys/stat.h>
 
 #include "error/errorUtil/GitResult.hpp"
 #include "main/checkout/gitlinks.hpp"
@@ -54,9 +56,23 @@ bool isSubmoduleIn(const Trees &trees, const std::string &path)
                        { return isGitlink(findEntry(tree.get(), path).get()); });
 }
 
+/// Whether ours has removed the submodule that theirs has moved, and its repository is still there.
+bool isTheirsAndThere(git_repository *repository, git_index *index, const git_index_entry &theirs)
+{
+    const char *const workdir = git_repository_workdir(repository);
+    if (workdir == nullptr || GIT_INDEX_ENTRY_STAGE(&theirs) != GIT_INDEX_STAGE_THEIRS ||
+        git_index_get_bypath(index, theirs.path, GIT_INDEX_STAGE_OURS) != nullptr)
+    {
+        return false;
+    }
+    struct stat status = {};
+    return lstat((std::string(workdir) + theirs.path + "/.git").c_str(), &status) == 0;
+}
+
 } // namespace
 
-CommitSubmodules::CommitSubmodules(git_index *index, const std::vector<const git_commit *> &parents)
+CommitSubmodules::CommitSubmodules(git_repository *repository, git_index *index,
+                                   const std::vector<const git_commit *> &parents)
 {
     Trees trees;
     const std::size_t count = git_index_entrycount(index);
@@ -76,7 +92,7 @@ CommitSubmodules::CommitSubmodules(git_index *index, const std::vector<const git
         {
             submodules_.push_back({entry->path, *entry});
         }
-        else if (stage == GIT_INDEX_STAGE_OURS)
+        else if (stage == GIT_INDEX_STAGE_OURS || isTheirsAndThere(repository, index, *entry))
         {
             conflicts_.push_back({entry->path, *entry});
         }

@@ -22,10 +22,12 @@ class CommitSubmodules
     /// could not write a file, the index has whatever the memory held in place of its mode, a
     /// submodule's for example. git_commit_tree, git_tree_entry_bypath.
     /// @throws LibGit2Exception
-    CommitSubmodules(git_index *index, const std::vector<const git_commit *> &parents);
+    CommitSubmodules(git_repository *repository, git_index *index,
+                     const std::vector<const git_commit *> &parents);
 
     /// Resolves submodules in conflict to ours, in memory, so that the refresh takes them as they
-    /// stand. git_index_remove, git_index_add.
+    /// are checked out. One that ours has removed is resolved to theirs if its repository is in the
+    /// folder, otherwise it stays removed. git_index_remove, git_index_add.
     /// @throws LibGit2Exception
     void resolve(git_index *index) const;
 
@@ -48,7 +50,7 @@ class CommitSubmodules
     };
 
     std::vector<Submodule> submodules_;
-    /// Our side of those in conflict.
+    /// One side of each of those in conflict.
     std::vector<Submodule> conflicts_;
 };
 

@@ -119,7 +119,7 @@ void GitAdapter::refreshForCommit(git_repository *repository, git_index *index,
                                   const git_commit *head,
                                   const std::vector<const git_commit *> &parents) const
 {
-    const CommitSubmodules submodules(index, parents);
+    const CommitSubmodules submodules(repository, index, parents);
     submodules.resolve(index);
     if (expectedMerge_ != nullptr)
     {

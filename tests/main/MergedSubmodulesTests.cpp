@@ -88,6 +88,29 @@ class MergedSubmodules : public vclink::test::MergeTest
         repository_.add({"ours"});
         repository_.commit("on before");
     }
+    /// Merges "topic", which has moved the submodule, into main, which has removed it and left its
+    /// folder.
+    void weRemoveAndTheyMove()
+    {
+        makeBranch("topic", moving(second_));
+        removing()();
+        repository_.commit("on main");
+        repository_.write(".git/info/exclude", "/module\n");
+        expectConflicts("topic");
+    }
+    static vclink::test::CommandResult commitByGit(const GitRepository &repository)
+    {
+        return repository.tryGit({"commit", "--quiet", "--all", "--message", "merged"});
+    }
+    /// Commits as the library does, and as `git commit --all` does in a twin.
+    void expectCommitAsGit() const
+    {
+        const GitRepository twin = makeTwin();
+        EXPECT_TRUE(commitByGit(twin).succeeded());
+        commit();
+        EXPECT_EQ(idOf("HEAD^{tree}"), twin.line({"rev-parse", "HEAD^{tree}"}));
+        EXPECT_THAT(parents(), testing::SizeIs(2));
+    }
     void expectAsGitBesideTheFolder() const
     {
         const auto expected = outcomeByGit("topic");
@@ -254,6 +277,40 @@ TEST_F(MergedSubmodules, ThatWeRemovedAndTheyMovedAreInConflictBesideAnIgnoredFo
     repository_.write(".git/info/exclude", "/module\n");
     expectAsGitBesideTheFolder();
     EXPECT_THAT(conflicts(), ElementsAre("1 module", "3 module"));
+}
+
+/// As in a clone of git, where `git rm` has left the folder of a submodule with edits.
+TEST_F(MergedSubmodules, ThatWeRemovedAndTheyMovedAreTakenAsTheyAreCheckedOut)
+{
+    weRemoveAndTheyMove();
+    for (const std::string &id : {first_, second_, third_})
+    {
+        go(id);
+        expectCommitAsGit();
+        EXPECT_EQ(idOf("HEAD:module"), id);
+        repository_.git({"reset", "--quiet", "--hard", "main@{1}"});
+        expectConflicts("topic");
+    }
+}
+
+TEST_F(MergedSubmodules, ThatWeRemovedAndTheyMovedStayRemovedWithTheirFolder)
+{
+    weRemoveAndTheyMove();
+    repository_.remove("module");
+    expectCommitAsGit();
+    EXPECT_EQ(repository_.line({"ls-tree", "--name-only", "HEAD", "module"}), "");
+}
+
+/// git commits nothing then: it has no commit to take.
+TEST_F(MergedSubmodules, ThatWeRemovedAndTheyMovedStayRemovedWithoutARepository)
+{
+    weRemoveAndTheyMove();
+    repository_.remove("module");
+    repository_.write("module/mine", "mine\n");
+    EXPECT_FALSE(commitByGit(makeTwin()).succeeded());
+    commit();
+    EXPECT_EQ(repository_.line({"ls-tree", "--name-only", "HEAD", "module"}), "");
+    EXPECT_EQ(repository_.read("module/mine"), "mine\n");
 }
 
 /// All that they did; a later commit must not take the merge for one that was interrupted.
