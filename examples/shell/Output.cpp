@@ -2,6 +2,7 @@
 #include "Output.hpp"
 
 #include <cerrno>
+#include <csignal>
 #include <cstdlib>
 #include <iostream>
 #include <system_error>
@@ -34,6 +35,30 @@ bool personWantsColour()
     return !refused && terminalHasControls();
 }
 
+/// Does nothing. A signal that is ignored would be ignored by merge commands as well, while a
+/// handler is not handed on to them.
+extern "C" void goOn(int /*signal*/)
+{
+}
+
+/// Whoever has the signal ignored wants to be told.
+bool isBrokenPipeAnError()
+{
+    struct sigaction action = {};
+    ::sigaction(SIGPIPE, nullptr, &action);
+    return action.sa_handler == SIG_IGN;
+}
+
+[[noreturn]] void failToWrite(int error)
+{
+    if (error == EPIPE && !isBrokenPipeAnError())
+    {
+        throw OutputClosed();
+    }
+    throw ShellFailure(
+        "Standard output can't be written: " + std::generic_category().message(error) + ".");
+}
+
 } // namespace
 
 Output::Output() : hasColour_(::isatty(STDOUT_FILENO) == 1 && personWantsColour())
@@ -61,8 +86,7 @@ void Output::flush()
         }
         else if (errno != EINTR)
         {
-            throw ShellFailure("Standard output can't be written: " +
-                               std::generic_category().message(errno) + ".");
+            failToWrite(errno);
         }
     }
 }
@@ -88,6 +112,19 @@ void remark(const std::string &text)
     {
         std::cerr << makePrintable(fl::i18n::utf8_to_ustring(text)) + '\n';
     }
+}
+
+void surviveClosedPipes()
+{
+    if (isBrokenPipeAnError())
+    {
+        return;
+    }
+    struct sigaction action = {};
+    action.sa_handler = goOn;
+    action.sa_flags = SA_RESTART;
+    ::sigemptyset(&action.sa_mask);
+    ::sigaction(SIGPIPE, &action, nullptr);
 }
 
 void holdStandardDescriptors()

@@ -16,9 +16,10 @@ class Output
     Output &operator=(const Output &) = delete;
     ~Output() = default;
 
-    /// @throws ShellFailure when standard output can't be written
+    /// @throws OutputClosed, ShellFailure when standard output can't be written
     void write(std::string_view text);
-    /// @throws ShellFailure when standard output can't be written; nothing is left to flush then
+    /// @throws OutputClosed, ShellFailure when standard output can't be written; nothing is left to
+    /// flush then
     void flush();
 
     /// Whether a person sees the output and a colour says something to them.
@@ -38,6 +39,11 @@ bool errorsCanBeRedrawn() noexcept;
 /// Tells what was done, in a line on standard error, to a person who sees it: nothing is written
 /// where that is no terminal.
 void remark(const std::string &text);
+
+/// Lets the program go on when nobody reads its output or its messages any more, as in a pipe to
+/// "head": a merge must not end in the midst of its writing. Programs that are started meanwhile
+/// end by the signal as usual. Where the signal was ignored before, it stays ignored.
+void surviveClosedPipes();
 
 /// Makes sure that standard input, output and error are taken, so that no file that is opened later
 /// gets one of their numbers and what is meant for it. Where one was closed, using it still fails.

@@ -15,7 +15,7 @@ enum ExitStatus : int
 };
 
 /// The status of a program that a signal stopped, as shells show it: 130 for Ctrl-C, 143 for
-/// SIGTERM, 129 for SIGHUP.
+/// SIGTERM, 129 for SIGHUP, 141 for SIGPIPE.
 constexpr ExitStatus endedBy(int signal) noexcept
 {
     return static_cast<ExitStatus>(128 + signal);

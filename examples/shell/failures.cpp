@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "failures.hpp"
 
+#include <csignal>
 #include <exception>
 #include <iostream>
 
@@ -48,6 +49,10 @@ ExitStatus reportFailure()
     {
         complain(cancelledText());
         return Cancelled;
+    }
+    catch (const OutputClosed &)
+    {
+        return endedBy(SIGPIPE);
     }
     catch (const foundation::core::except::IUserException &failure)
     {

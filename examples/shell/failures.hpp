@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include <exception>
 #include <stdexcept>
 #include <string>
 
@@ -16,11 +17,21 @@ class ShellFailure : public std::runtime_error
     using std::runtime_error::runtime_error;
 };
 
+/// Nobody reads standard output any more.
+class OutputClosed : public std::exception
+{
+  public:
+    const char *what() const noexcept override
+    {
+        return "Standard output is closed.";
+    }
+};
+
 /// Writes a line, or a few, to standard error, under the program's name.
 void complain(const std::string &text);
 
 /// Tells the person of the exception in flight, in the words that it has for them: its localized
-/// text where it has one. To be called in a handler only.
+/// text where it has one. Of OutputClosed it says nothing. To be called in a handler only.
 /// @return the status to end with
 ExitStatus reportFailure();
 

@@ -101,5 +101,6 @@ ExitStatus run(int argc, const char *const *argv)
 int main(int argc, char **argv)
 {
     vclink::shell::holdStandardDescriptors();
+    vclink::shell::surviveClosedPipes();
     return vclink::shell::run(argc, argv);
 }
