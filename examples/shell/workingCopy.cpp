@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: MIT
 #include "workingCopy.hpp"
 
+#include <algorithm>
+#include <array>
 #include <fstream>
 #include <optional>
 #include <string>
@@ -27,6 +29,37 @@ bool hasFilesInHead(CMAdapter &adapter)
     return tree && *tree != emptyTree;
 }
 
+/// Whether Git tracks a file, in an index that the library may be unable to read.
+bool hasFilesInIndex(const fs::path &root)
+{
+    // "DIRC", the version, and the number of entries: four bytes each.
+    std::array<char, 12> header{};
+    std::ifstream index(stateFolder(root) / "index", std::ios::binary);
+    return index.read(header.data(), header.size()) &&
+           std::any_of(header.begin() + 8, header.end(), [](char byte) { return byte != 0; });
+}
+
+/// Whether there is anything but folders, and what Git keeps.
+bool hasFilesOnDisk(const fs::path &root)
+{
+    std::error_code error;
+    fs::recursive_directory_iterator entry(root, fs::directory_options::skip_permission_denied,
+                                           error);
+    for (; !error && entry != fs::recursive_directory_iterator(); entry.increment(error))
+    {
+        std::error_code ignored;
+        if (entry->path().filename() == ".git")
+        {
+            entry.disable_recursion_pending();
+        }
+        else if (!fs::is_directory(entry->symlink_status(ignored)))
+        {
+            return true;
+        }
+    }
+    return false;
+}
+
 /// A question for this file alone can be answered.
 bool isGitmodulesInConflict(CMAdapter &adapter)
 {
@@ -46,6 +79,13 @@ std::string explainUnknownStates(CMAdapter &adapter)
     return "The states of the files are not known: libgit2 can't read this working copy. "
            "\"git status\" may\nsay why: a .gitmodules with an error, a setting with a value that "
            "it can't have, or folders\nmore than 100 levels deep.";
+}
+
+std::string explainNoStates()
+{
+    return "No file here has a state: either Git ignores all files, or libgit2 can't read this "
+           "working copy.\n\"git status\" may say which: a setting with a value that it can't "
+           "have, for example.";
 }
 
 } // namespace
@@ -79,10 +119,15 @@ FileStateMap wholeStates(CMAdapter &adapter)
 void refuseUnknownStates(CMAdapter &adapter)
 {
     const upath &root = adapter.getRootFolder();
-    if (hasGitEntry(nativePath(root)) && hasFilesInHead(adapter) &&
-        adapter.getFolderStates(root).empty())
+    const fs::path folder = nativePath(root);
+    if (!hasGitEntry(folder))
     {
-        throw ShellFailure(explainUnknownStates(adapter));
+        return;
+    }
+    const bool isTracking = hasFilesInHead(adapter) || hasFilesInIndex(folder);
+    if ((isTracking || hasFilesOnDisk(folder)) && adapter.getFolderStates(root).empty())
+    {
+        throw ShellFailure(isTracking ? explainUnknownStates(adapter) : explainNoStates());
     }
 }
 

@@ -81,6 +81,31 @@ TEST_F(ShellUnknownStates, AreSaidToBeWhereFoldersAreTooDeep)
     expectUnknown({"commit", "-m", "Work"});
 }
 
+TEST_F(ShellUnknownStates, AreSaidToBeBeforeTheFirstCommitToo)
+{
+    const GitRepository young = makeRepository("young");
+    young.git({"config", "core.ignorecase", "bogus"});
+    const auto errorsOf = [&young, this](const std::vector<std::string> &arguments)
+    {
+        const CommandResult result = runIn(young.path(), arguments);
+        EXPECT_EQ(result.exitStatus, 1) << arguments.front();
+        EXPECT_EQ(result.output, "");
+        return result.errors;
+    };
+    young.write("folder/new", "");
+    EXPECT_EQ(errorsOf({"status"}),
+              "vclink-shell: No file here has a state: either Git ignores all files, or libgit2 "
+              "can't read this working copy.\n\"git status\" may say which: a setting with a value "
+              "that it can't have, for example.\n");
+    EXPECT_THAT(errorsOf({"add", "folder/new"}),
+                StartsWith("vclink-shell: No file here has a state: "));
+    young.git({"config", "--unset", "core.ignorecase"});
+    young.add({"folder/new"});
+    young.remove("folder/new");
+    young.git({"config", "core.ignorecase", "bogus"});
+    EXPECT_THAT(errorsOf({"status"}), StartsWith("vclink-shell: " + reason()));
+}
+
 TEST_F(ShellUnknownStates, AreNotThoseOfAnEmptyRepositoryOrABareOne)
 {
     const GitRepository empty = makeRepository("empty");
