@@ -13,6 +13,7 @@
 #include "commands.hpp"
 #include "failures.hpp"
 #include "mergeLeftovers.hpp"
+#include "mergeObstacles.hpp"
 #include "namedPaths.hpp"
 #include "revisions.hpp"
 #include "runStoppable.hpp"
@@ -87,8 +88,7 @@ class MergeCommand : public Command
         }
         else if (notes.failure == wouldLoseWork)
         {
-            complain("Nothing was merged. Commit the changes that would be lost, or move the files "
-                     "out of the way, and\nmerge again.");
+            tellWhatIsInTheWay(session.adapter(), theirs);
         }
         return status;
     }
@@ -128,6 +128,21 @@ class MergeCommand : public Command
         output.flush();
     }
 
+    /// What might have been lost, and how to get it out of the way.
+    static void tellWhatIsInTheWay(CMAdapter &adapter, const std::optional<std::string> &theirs)
+    {
+        const upath &root = adapter.getRootFolder();
+        const MergeObstacles obstacles = findMergeObstacles(adapter, theirs);
+        tellIfAny("These files have uncommitted changes:", obstacles.changed, root, "");
+        tellIfAny("These files are not tracked, and the other side has something in their place:",
+                  obstacles.untracked, root, "");
+        tellIfAny("The folders of these submodules are missing:", obstacles.missingSubmodules, root,
+                  "\nBring them back with \"git submodule update --init\" first. A commit would "
+                  "leave these submodules out.");
+        complain("Nothing was merged. Commit the changes that would be lost, or move the files "
+                 "out of the way, and\nmerge again.");
+    }
+
     /// How to finish what was under way before.
     static void tellUnfinished(CMAdapter &adapter)
     {
@@ -156,7 +171,7 @@ class MergeCommand : public Command
                   "conflict markers:",
                   findRefused(adapter, conflicts, notes), root, "");
         tellIfAny("These files have another name now, because something else has theirs:",
-                  findSetAside(states), root,
+                  findSetAside(root, states), root,
                   "\nThe merge leaves them out: move what you want to keep to its place, and add "
                   "it.");
     }

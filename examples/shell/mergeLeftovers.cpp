@@ -1,8 +1,10 @@
 // SPDX-License-Identifier: MIT
 #include "mergeLeftovers.hpp"
 
+#include <filesystem>
 #include <memory>
 #include <string>
+#include <system_error>
 
 #include "fl/i18n/convert.hpp"
 #include "namedPaths.hpp"
@@ -11,11 +13,14 @@
 #include "states.hpp"
 #include "vclink/git/BranchManager.hpp"
 #include "vclink/git/GitAttributes.hpp"
+#include "workingCopy.hpp"
 
 namespace vclink::shell
 {
 namespace
 {
+
+namespace fs = std::filesystem;
 
 std::string nameOf(const upath &file, const upath &root)
 {
@@ -70,6 +75,26 @@ bool isTaken(const ustring &name, const FileStateMap &states)
     return next != states.end() && liesIn(next->first.string(), name);
 }
 
+/// Whether the name is that of something else, with a side behind it.
+bool isSetAside(const ustring &name, const FileStateMap &states)
+{
+    const std::size_t mark = name.rfind(u'~');
+    return mark != ustring::npos && isSide(name.substr(mark + 1)) &&
+           isTaken(name.substr(0, mark), states);
+}
+
+bool isFolder(const fs::directory_entry &entry)
+{
+    std::error_code ignored;
+    return fs::is_directory(entry.symlink_status(ignored));
+}
+
+/// What Git keeps, and the folders of other repositories.
+bool isForeign(const fs::directory_entry &entry)
+{
+    return entry.path().filename() == ".git" || (isFolder(entry) && hasGitEntry(entry.path()));
+}
+
 } // namespace
 
 FileStateMap findRefused(CMAdapter &adapter, const FileStateMap &conflicts, const MergeNotes &notes)
@@ -89,18 +114,27 @@ FileStateMap findRefused(CMAdapter &adapter, const FileStateMap &conflicts, cons
     return refused;
 }
 
-FileStateMap findSetAside(const FileStateMap &states)
+FileStateMap findSetAside(const upath &root, const FileStateMap &states)
 {
     FileStateMap found;
-    for (const auto &entry : states)
+    std::error_code error;
+    // From the disk: states leave out what Git ignores.
+    fs::recursive_directory_iterator entry(nativePath(root),
+                                           fs::directory_options::skip_permission_denied, error);
+    for (; !error && entry != fs::recursive_directory_iterator(); entry.increment(error))
     {
-        const ustring &name = entry.first.string();
-        const std::size_t mark = name.rfind(u'~');
-        const bool isNew = entry.second.getState() == FileState::Unversioned;
-        if (isNew && mark != ustring::npos && isSide(name.substr(mark + 1)) &&
-            isTaken(name.substr(0, mark), states))
+        if (isForeign(*entry))
         {
-            found.insert(found.end(), entry);
+            entry.disable_recursion_pending();
+            continue;
+        }
+        const upath path = makePath(entry->path());
+        const auto state = states.find(path);
+        const bool isNew =
+            state == states.end() || state->second.getState() == FileState::Unversioned;
+        if (isNew && isSetAside(path.string(), states) && !isFolder(*entry))
+        {
+            found.emplace(path, FileState(FileState::Unversioned));
         }
     }
     return found;

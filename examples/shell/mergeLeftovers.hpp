@@ -14,8 +14,9 @@ namespace vclink::shell
 FileStateMap findRefused(CMAdapter &adapter, const FileStateMap &conflicts,
                          const MergeNotes &notes);
 
-/// The files that have another name than in the commits, because something else has theirs.
+/// The files that have another name than in the commits, because something else has theirs;
+/// ignored ones, too.
 /// @param states of the whole working copy
-FileStateMap findSetAside(const FileStateMap &states);
+FileStateMap findSetAside(const upath &root, const FileStateMap &states);
 
 } // namespace vclink::shell

@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: MIT
 #include <csignal>
+#include <filesystem>
 
 #include <gmock/gmock.h>
 
@@ -10,6 +11,7 @@ namespace vclink::test
 namespace
 {
 
+namespace fs = std::filesystem;
 using testing::AllOf;
 using testing::EndsWith;
 using testing::HasSubstr;
@@ -92,6 +94,14 @@ TEST_F(ShellMergeLeftovers, TellThemOfBothSides)
     EXPECT_EQ(repository_.read("new~" + theirs), "theirs\n");
 }
 
+TEST_F(ShellMergeLeftovers, TellThemIfGitIgnoresThem)
+{
+    makeBranch("other", {{"new/inside", "theirs\n"}, {"f/new/inside", "theirs\n"}});
+    commitFiles({{"new", "ours\n"}, {"f/new", "ours\n"}});
+    repository_.write(".git/info/exclude", "*~*\n");
+    EXPECT_THAT(fail({"merge", "other"}), HasSubstr(asideBegin + "  f/new~HEAD\n  new~HEAD\n"));
+}
+
 TEST_F(ShellMergeLeftovers, DoNotTellOfOtherNewFilesWithATilde)
 {
     clash();
@@ -134,21 +144,46 @@ class ShellInterruptedMerge : public ShellMergeTest
         clash();
         repository_.git({"config", "merge.kills.driver", "sh -c \"kill -9 $PPID\""});
         EXPECT_EQ(run({"merge", "other"}).signal, SIGKILL);
-        repository_.remove(".git/index.lock");
+        fs::rename(repository_ / ".git/index.lock", folder() / "lock");
     }
+
+    const std::string recognised_ =
+        "vclink-shell: A merge was interrupted before all of it was written, and can't be "
+        "concluded. \"vclink-shell commit\"\nsays so, and names the commands that bring the "
+        "working copy back as it was before.";
 };
 
 TEST_F(ShellInterruptedMerge, IsRecognised)
 {
-    const std::string recognised =
-        "vclink-shell: A merge was interrupted before all of it was written, and can't be "
-        "concluded. \"vclink-shell commit\"\nsays so, and names the commands that bring the "
-        "working copy back as it was before.\n";
     const CommandResult state = run({"state"});
     EXPECT_EQ(state.output, "Conflicts\n");
-    EXPECT_EQ(state.errors, recognised);
+    EXPECT_EQ(state.errors, recognised_ + '\n');
     EXPECT_EQ(state.exitStatus, 0);
-    EXPECT_THAT(fail({"merge", "other"}), EndsWith('\n' + recognised));
+    EXPECT_THAT(fail({"merge", "other"}), EndsWith('\n' + recognised_ + '\n'));
+}
+
+TEST_F(ShellInterruptedMerge, NamesTheLockThatItHasLeft)
+{
+    fs::rename(folder() / "lock", repository_ / ".git/index.lock");
+    const std::string withLock = recognised_ + "\nRemove .git/index.lock first, unless another "
+                                               "program is using Git here just now.\n";
+    EXPECT_EQ(run({"state"}).errors, withLock);
+    EXPECT_THAT(fail({"merge", "other"}), EndsWith('\n' + withLock));
+}
+
+/// What tells the back end that it was interrupted is there until its next operation.
+TEST_F(ShellInterruptedMerge, IsNotTakenForAMergeThatGitHasBegunSince)
+{
+    repository_.git({"config", "--unset", "merge.kills.driver"});
+    repository_.git({"reset", "--quiet", "--hard"});
+    EXPECT_EQ(repository_.tryGit({"merge", "--quiet", "other"}).exitStatus, 1);
+    EXPECT_TRUE(fs::exists(repository_ / ".git/vclink-merge"));
+    const CommandResult state = run({"state"});
+    EXPECT_EQ(state.output, "Conflicts\n");
+    EXPECT_EQ(state.errors, "");
+    EXPECT_THAT(fail({"merge", "other"}),
+                EndsWith("\nvclink-shell: A merge is under way. Conclude it with \"vclink-shell "
+                         "commit\", or undo it with \"git merge --abort\".\n"));
 }
 
 TEST_F(ShellInterruptedMerge, CannotBeConcludedAndTellsTheWayOut)

@@ -72,6 +72,60 @@ TEST_F(ShellMergeOverChanges, IsRefusedOverStagedChangesAndChangesOfTheSameFiles
     expectRefused("(code -13, ");
 }
 
+TEST_F(ShellMergeOverChanges, NamesTheFilesWithChanges)
+{
+    const std::string changed = "\nvclink-shell: These files have uncommitted changes:\n  ";
+    diverge();
+    repository_.write("folder/c", "edited\n");
+    repository_.add({"folder/c"});
+    expectRefused(changed + "folder/c\nvclink-shell: Nothing");
+    repository_.git({"reset", "--quiet", "--hard"});
+    repository_.write("a", "edited\n");
+    repository_.remove("b");
+    expectRefused(changed + "a\n  b\nvclink-shell: Nothing");
+}
+
+TEST_F(ShellMergeOverChanges, NamesTheUntrackedFilesWhereTheOtherSideHasSomething)
+{
+    makeBranch("other", {{"new", "theirs\n"}, {"taken/inside", "theirs\n"}});
+    commitFiles({{"b", "ours\n"}});
+    repository_.write("new/mine", "mine\n");
+    repository_.write("taken", "mine\n");
+    repository_.write("folder/new", "mine\n");
+    repository_.write("unrelated", "mine\n");
+    expectRefused(
+        "\nvclink-shell: These files are not tracked, and the other side has something in "
+        "their place:\n  new/mine\n  taken\nvclink-shell: Nothing");
+}
+
+/// A commit of everything would leave the submodule out.
+TEST_F(ShellMergeOverChanges, TellsHowToBringBackASubmoduleThatIsMissing)
+{
+    GitRepository inner = makeRepository("inner");
+    inner.write("file", "1\n");
+    const std::string first = inner.commitAll("1");
+    inner.write("file", "2\n");
+    const std::string second = inner.commitAll("2");
+    repository_.git({"submodule", "--quiet", "add", inner.path(), "module"});
+    const GitRepository module(repository_ / "module");
+    module.git({"checkout", "--quiet", first});
+    repository_.commitAll("module");
+    repository_.git({"checkout", "--quiet", "-b", "other"});
+    module.git({"checkout", "--quiet", second});
+    repository_.commitAll("moved");
+    repository_.git({"checkout", "--quiet", "main"});
+    module.git({"checkout", "--quiet", first});
+    commitFiles({{"b", "ours\n"}});
+    repository_.remove("module");
+    expectRefused(
+        "\nvclink-shell: The folders of these submodules are missing:\n  module\nBring "
+        "them back with \"git submodule update --init\" first. A commit would leave these "
+        "submodules out.\nvclink-shell: Nothing");
+    repository_.git({"submodule", "--quiet", "update", "--init"});
+    EXPECT_THAT(run({"merge", "other"}).output, StartsWith("Merge commit "));
+    EXPECT_EQ(repository_.line({"rev-parse", "HEAD:module"}), second);
+}
+
 TEST_F(ShellMergeOverChanges, GoesOnWhereNothingIsLost)
 {
     diverge();
