@@ -1,0 +1,73 @@
+// SPDX-License-Identifier: MIT
+#include <memory>
+#include <optional>
+
+#include <gtest/gtest.h>
+
+#include "fl/filesystem/path.hpp"
+#include "support/GitTest.hpp"
+#include "support/TestInteractor.hpp"
+#include "support/text.hpp"
+#include "vclink/CMAdapter.hpp"
+#include "vclink/FileStateMap.hpp"
+#include "vclink/git/BranchManager.hpp"
+#include "vclink/git/GitAdapterFactory.hpp"
+
+// examples/integrating/states.cpp
+bool hasFilesInHead(const vclink::git::BranchManager &branches);
+std::optional<vclink::FileStateMap> readStates(vclink::CMAdapter &adapter);
+
+namespace
+{
+
+using vclink::FileState;
+using vclink::test::asPath;
+using vclink::test::GitRepository;
+
+class StatesRecipe : public vclink::test::GitTest
+{
+  protected:
+    bool hasFiles() const
+    {
+        return hasFilesInHead(*vclink::git::BranchManager::create(*adapter_));
+    }
+
+    GitRepository repository_ = makeRepository();
+    std::unique_ptr<vclink::CMAdapter> adapter_ = vclink::git::GitAdapterFactory().createAdapterFor(
+        asPath(repository_.path()), std::make_shared<vclink::test::TestInteractor>());
+};
+
+TEST_F(StatesRecipe, GivesTheStatesOfAllFiles)
+{
+    repository_.write("file", "1\n");
+    repository_.commitAll("begin");
+    repository_.write("file", "2\n");
+    repository_.write("new", "");
+    EXPECT_TRUE(hasFiles());
+    const auto states = readStates(*adapter_);
+    ASSERT_TRUE(states.has_value());
+    const auto stateOf = [&](const char *name)
+    { return states->at(asPath((repository_ / name).string())).getState(); };
+    EXPECT_EQ(states->size(), 2U);
+    EXPECT_EQ(stateOf("file"), FileState::Modified);
+    EXPECT_EQ(stateOf("new"), FileState::Unversioned);
+}
+
+TEST_F(StatesRecipe, SaysThatTheyCannotBeKnown)
+{
+    repository_.write("file", "1\n");
+    repository_.commitAll("begin");
+    repository_.git({"config", "core.ignorecase", "bogus"});
+    EXPECT_FALSE(readStates(*adapter_).has_value());
+}
+
+TEST_F(StatesRecipe, TakesAnEmptyWorkingCopyAsOne)
+{
+    EXPECT_FALSE(hasFiles());
+    EXPECT_TRUE(readStates(*adapter_).has_value());
+    repository_.commitAll("empty");
+    EXPECT_FALSE(hasFiles());
+    EXPECT_TRUE(readStates(*adapter_).has_value());
+}
+
+} // namespace
