@@ -79,6 +79,17 @@ void Passing::setError()
     git_error_set_str(GIT_ERROR_OS, injectedText);
 }
 
+void Passing::leaveText() const
+{
+    // libgit2 looks at what is left in a callback. After its end nothing can be left.
+    if (depth > 1 || function_ == std::string_view("git_libgit2_shutdown"))
+        return;
+    const Unseen unseen;
+    const git_error *const error = git_error_last();
+    if (error == nullptr || error->klass == GIT_ERROR_NONE)
+        git_error_set_str(GIT_ERROR_CONFIG, earlierText);
+}
+
 } // namespace detail
 
 LibGit2Recorder::LibGit2Recorder(InCallbacks inCallbacks) : inCallbacks_(inCallbacks)

@@ -35,6 +35,10 @@ struct LibGit2Fault
 /// The text of the error record that a failing call leaves; its class is GIT_ERROR_OS.
 inline const char *const injectedText = "injected";
 
+/// The text of the error record after each call that has succeeded: libgit2 leaves texts there
+/// where it goes on from a failure of its own. The library never shows it.
+inline const char *const earlierText = "left by an earlier call";
+
 /// A call of the library, or an event that a test has noted between two of them.
 struct LibGit2Call
 {

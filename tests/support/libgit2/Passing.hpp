@@ -60,6 +60,8 @@ class Passing
     void giveOut(const void *handle) const;
     /// Leaves the error record of a failing call.
     static void setError();
+    /// Leaves earlierText after a call that has succeeded, unless libgit2 has left a text itself.
+    void leaveText() const;
 
   private:
     template <class Function>

@@ -104,10 +104,14 @@ template <class Result, class... Arguments> struct Shim<Result(Arguments...)>
             if (handle != nullptr)
                 passing.giveOut(handle);
         }
-        if (!fault)
-            return code;
-        Passing::setError();
-        return fault->code;
+        if (fault)
+        {
+            Passing::setError();
+            return fault->code;
+        }
+        if (code >= 0)
+            passing.leaveText();
+        return code;
     }
     /// The test's answer, or libgit2's.
     static Result answer(const Passing &passing, Real real, Arguments... arguments)
