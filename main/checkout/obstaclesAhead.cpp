@@ -20,6 +20,13 @@ bool makesFile(const TreeChange &change)
     return change.after != nullptr && !isGitlink(change.after);
 }
 
+/// Whether ours has deleted the file that theirs has changed. libgit2 writes such a file without a
+/// word before: it opens whatever is there, goes through links, and fails in the midst otherwise.
+bool isWrittenUnnoticed(WorkingCopy &copy, const TreeChange &change)
+{
+    return change.before != nullptr && makesFile(change) && copy.entryOf(change.path) == nullptr;
+}
+
 Obstacle stagedChangesOf(const std::string &name)
 {
     return {name, "the staged changes of '" + name + "' would be lost in the checkout"};
@@ -166,7 +173,8 @@ Finding findSubmoduleAfterSibling(WorkingCopy &copy, const TreeChange &change)
 Finding findBlockedWayOfMerge(WorkingCopy &copy, const TreeChange &change)
 {
     const WorkingCopy::Way &way = copy.wayTo(change.path);
-    const bool mayGo = way.standing == Standing::Link || way.standing == Standing::File;
+    const bool mayGo = (way.standing == Standing::Link || way.standing == Standing::File) &&
+                       !isWrittenUnnoticed(copy, change);
     if (way.blocker.empty() || (mayGo && copy.isIgnored(way.blocker)))
     {
         return {};
@@ -181,9 +189,8 @@ Finding findUntracked(WorkingCopy &copy, const TreeChange &change)
         return {};
     }
     const Standing standing = copy.at(change.path);
-    // Where ours has deleted the file libgit2 opens whatever is there, and fails at a folder.
-    const bool isOpened =
-        standing == Standing::Special || (standing == Standing::Folder && change.before != nullptr);
+    const bool isOpened = standing == Standing::Special ||
+                          (standing != Standing::File && isWrittenUnnoticed(copy, change));
     const bool isKeptFolder =
         standing == Standing::Folder &&
         (copy.isFolderInHead(change.path) || (!isOpened && !copy.holdsFiles(change.path)));

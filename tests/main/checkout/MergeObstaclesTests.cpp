@@ -341,6 +341,31 @@ TEST_F(MergeObstacles, AreUntrackedFilesWhereAConflictIsWritten)
     expectConflictsAsGit({"1 d/f", "3 d/f"});
 }
 
+TEST_F(MergeObstacles, AreIgnoredLinksWhereAConflictIsWritten)
+{
+    diverge([this] { repository_.remove("d/f"); }, writing("d/f", "theirs\n"));
+    repository_.write(".git/info/exclude", "/d/f\n");
+    repository_.symlink("../../outside/new", "d/f");
+    expectMergeRefused(inTheWay("symbolic link 'd/f'"));
+    expectNothingOutsideChanged();
+    repository_.remove("d/f");
+    expectConflictsAsGit({"1 d/f", "3 d/f"});
+}
+
+TEST_F(MergeObstacles, AreIgnoredLinksAboveAConflict)
+{
+    diverge([this] { repository_.remove("d"); }, writing("d/f", "theirs\n"));
+    repository_.write(".git/info/exclude", "/d\n");
+    repository_.symlink("../outside", "d");
+    expectMergeRefused(inTheWay("symbolic link 'd'"));
+    expectNothingOutsideChanged();
+    repository_.remove("d");
+    repository_.write("d", "ignored\n");
+    expectMergeRefused(inTheWay("untracked file 'd'"));
+    repository_.remove("d");
+    expectConflictsAsGit({"1 d/f", "3 d/f"});
+}
+
 TEST_F(MergeObstacles, AreLinksAboveAConflict)
 {
     diverge([this] { repository_.remove("d"); }, writing("d/f", "theirs\n"));
