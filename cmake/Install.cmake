@@ -12,7 +12,7 @@ vclink_install_package_files(vclink_git "${PROJECT_SOURCE_DIR}/cmake/package"
     COMPONENT development)
 
 # Laid as they are here, so that their links lead to each other, and to the examples.
-install(FILES README.md
+install(FILES README.md CHANGELOG.md SECURITY.md
     DESTINATION share/doc/libvclink-git-dev
     COMPONENT development)
 install(DIRECTORY docs

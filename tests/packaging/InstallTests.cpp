@@ -82,7 +82,8 @@ TEST_F(Component, DevelopmentIsTheExportedHeadersWhatFindsTheLibraryAndTheDocume
         expected.push_back(name);
     }
     const std::string documents = "share/doc/libvclink-git-dev/";
-    for (const auto *name : {"copyright", "README.md", "examples/hostTools.hpp"})
+    for (const auto *name :
+         {"copyright", "CHANGELOG.md", "README.md", "SECURITY.md", "examples/hostTools.hpp"})
     {
         expected.push_back(documents + name);
     }
