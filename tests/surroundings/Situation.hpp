@@ -57,6 +57,13 @@ void makeSurroundings(const std::filesystem::path &folder);
 const std::vector<Place> &submodulePlaces();
 const std::vector<Obstacle> &submoduleObstacles();
 
+/// Where ours, too, has done something to a submodule: on "ours-adds", "ours-moves",
+/// "ours-removes" and "ours-files".
+const std::vector<Place> &addedSubmodulePlaces();
+const std::vector<Place> &movedSubmodulePlaces();
+const std::vector<Place> &removedSubmodulePlaces();
+const std::vector<Place> &replacedSubmodulePlaces();
+
 /// Makes "copy", a working copy on "main" with submodules, and "source", where these come from.
 /// Each of its branches changes the first and the last file as well, but those that begin with
 /// "ours".

@@ -33,6 +33,9 @@ struct SubmoduleOperation
     int commonOnes;
     /// none for all
     std::vector<std::string> branches{};
+    const std::vector<Place> &(*places)() = vclink::test::submodulePlaces;
+    /// Completes what a switch to the branch `start` has left.
+    void (*begin)(const GitRepository &copy) = [](const GitRepository &) {};
 };
 
 std::ostream &operator<<(std::ostream &stream, const SubmoduleOperation &operation)
@@ -56,6 +59,18 @@ void switchThereAndBack(git::BranchManager &branches, const std::string &branch)
     branches.switchBranch("main");
 }
 
+void populate(const GitRepository &copy)
+{
+    copy.git({"submodule", "--quiet", "update", "--init", "new"});
+}
+
+/// As after a clone; an obstacle puts a folder back.
+void removeLeftFolders(const GitRepository &copy)
+{
+    copy.remove("s");
+    copy.remove("t/s");
+}
+
 const std::vector<std::string> mergeByGit{"merge", "--quiet", "--no-edit"};
 const std::vector<std::string> thereAndBackByGit{
     "-c", "alias.visit=!f() { git switch --quiet $1 && git switch --quiet main; }; f", "visit"};
@@ -67,7 +82,31 @@ const std::vector<SubmoduleOperation> submoduleOperations{
      mergeByGit,
      mergeInto,
      2,
-     {"moves", "removes", "unrelated"}},
+     {},
+     vclink::test::movedSubmodulePlaces},
+    {"merge into added submodules",
+     "ours-adds",
+     mergeByGit,
+     mergeInto,
+     2,
+     {},
+     vclink::test::addedSubmodulePlaces,
+     populate},
+    {"merge into removed submodules",
+     "ours-removes",
+     mergeByGit,
+     mergeInto,
+     1,
+     {},
+     vclink::test::removedSubmodulePlaces,
+     removeLeftFolders},
+    {"merge into replaced submodules",
+     "ours-files",
+     mergeByGit,
+     mergeInto,
+     1,
+     {},
+     vclink::test::replacedSubmodulePlaces},
     {"fast-forward of submodules",
      "main",
      {"merge", "--quiet", "--ff-only"},
@@ -133,7 +172,8 @@ TEST_P(BranchesWithSubmodules, LoseNothingThatGitKeepsAndOtherwiseDifferByRuleOn
 {
     const SubmoduleOperation &operation = GetParam();
     go(operation.start);
-    for (const auto &place : vclink::test::submodulePlaces())
+    operation.begin(original());
+    for (const auto &place : operation.places())
     {
         for (const auto &obstacle : obstacles_)
         {

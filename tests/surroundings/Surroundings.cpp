@@ -50,7 +50,7 @@ Surroundings::Surroundings(void (*make)(const fs::path &folder))
 
 void Surroundings::go(const std::string &branch)
 {
-    GitRepository(original_ / "copy").git({"switch", "--quiet", branch});
+    original().git({"switch", "--quiet", branch});
     committed_ = committedContents(original_ / "copy");
 }
 

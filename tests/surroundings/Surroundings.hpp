@@ -29,6 +29,11 @@ class Surroundings : public GitTest
     explicit Surroundings(void (*make)(const std::filesystem::path &folder));
 
     void go(const std::string &branch);
+    /// The working copy that the twins are copies of.
+    GitRepository original() const
+    {
+        return GitRepository(original_ / "copy");
+    }
 
     struct Cell
     {

@@ -39,7 +39,11 @@ std::map<std::string, Files> filesOfBranches(const Commits &at)
     return {
         {"adds",
          {{".gitmodules", moreModules}, {"new", first}, {"t/new", first}, {"u/new", first}}},
+        {"adds-another",
+         {{".gitmodules", moreModules}, {"new", second}, {"t/new", second}, {"u/new", second}}},
+        {"adds-file", {{"new", "theirs\n"}}},
         {"moves", {{"s", second}, {"t/s", second}}},
+        {"moves-alike", {{"s", third}, {"t/s", third}}},
         {"removes", {{".gitmodules", gone}, {"s", gone}, {"t/s", gone}}},
         {"renames",
          {{".gitmodules", renamedModules},
@@ -52,6 +56,13 @@ std::map<std::string, Files> filesOfBranches(const Commits &at)
         {"unrelated", {{"t/different", "theirs\n"}}},
         {"takes", {{"file", first}, {"d/file", gone}, {"d/other", gone}, {"d", first}}},
         {"ours", {{"mine", "of ours\n"}}},
+        {"ours-adds",
+         {{"mine", "of ours\n"},
+          {".gitmodules", moreModules},
+          {"new", first},
+          {"t/new", first},
+          {"u/new", first}}},
+        {"ours-files", {{"mine", "of ours\n"}, {"s", "ours\n"}}},
         {"ours-moves", {{"mine", "of ours\n"}, {"s", third}, {"t/s", third}}},
         {"ours-removes",
          {{"mine", "of ours\n"}, {".gitmodules", gone}, {"s", gone}, {"t/s", gone}}},
@@ -99,6 +110,67 @@ const std::vector<Place> &submodulePlaces()
         {"in a folder that becomes a submodule", Holds::file, rare, "d/file", "takes"},
         {"new in a folder that becomes a submodule", Holds::nothing, common, "d/new", "takes"},
         {"a folder that becomes a submodule", Holds::folder, common, "d", "takes"},
+    };
+    return places;
+}
+
+const std::vector<Place> &addedSubmodulePlaces()
+{
+    constexpr bool common = true;
+    constexpr auto submodule = Holds::submodule;
+    static const std::vector<Place> places{
+        {"a submodule that both added", submodule, common, "new", "adds"},
+        {"a submodule that both added with other commits", submodule, common, "new",
+         "adds-another"},
+        {"a submodule where they added a file", submodule, common, "new", "adds-file"},
+        {"a submodule that ours added", submodule, common, "new", "unrelated"},
+    };
+    return places;
+}
+
+const std::vector<Place> &movedSubmodulePlaces()
+{
+    constexpr bool common = true;
+    constexpr auto submodule = Holds::submodule;
+    static const std::vector<Place> places{
+        {"a submodule that both moved", submodule, common, "s", "moves"},
+        {"a submodule that both moved alike", submodule, common, "s", "moves-alike"},
+        {"a submodule that they removed", submodule, common, "s", "removes"},
+        {"a submodule that they renamed", submodule, common, "s", "renames"},
+        {"a submodule that they made a file", submodule, common, "s", "files", emptyIt},
+        {"a submodule that they made a folder", submodule, common, "s", "folders", emptyIt},
+        {"a submodule that ours moved", submodule, common, "s", "unrelated"},
+    };
+    return places;
+}
+
+const std::vector<Place> &removedSubmodulePlaces()
+{
+    constexpr bool common = true;
+    constexpr bool rare = false;
+    constexpr auto nothing = Holds::nothing;
+    static const std::vector<Place> places{
+        {"a submodule that both removed", nothing, common, "s", "removes"},
+        {"a submodule that both removed below a folder", nothing, rare, "t/s", "removes"},
+        {"a submodule that they moved", nothing, common, "s", "moves"},
+        {"a submodule that they renamed", nothing, common, "s", "renames"},
+        {"a submodule that they made a file", nothing, common, "s", "files"},
+        {"a submodule that they made a folder", nothing, common, "s", "folders"},
+        {"a submodule that ours removed", nothing, common, "s", "unrelated"},
+    };
+    return places;
+}
+
+const std::vector<Place> &replacedSubmodulePlaces()
+{
+    constexpr bool common = true;
+    constexpr auto file = Holds::file;
+    static const std::vector<Place> places{
+        {"a submodule that both made a file", file, common, "s", "files"},
+        {"a submodule that they made a folder", file, common, "s", "folders"},
+        {"a submodule that they moved", file, common, "s", "moves"},
+        {"a submodule that they removed", file, common, "s", "removes"},
+        {"a submodule that ours made a file", file, common, "s", "unrelated"},
     };
     return places;
 }
