@@ -176,6 +176,8 @@ void CheckoutWatch::lookBeforeMerge(const git_oid *theirs)
     const OwnedHandle<git_tree> after = treeOf(repository_, theirs);
     const MergeBases bases(repository_, &ours, theirs);
     Finding first = findHiddenEdit(copy);
+    Finding yielding;
+    bool mayBeRenamed = false;
     // Histories that are unrelated have the empty tree in common.
     for (std::size_t i = 0; i == 0 || i < bases.size(); ++i)
     {
@@ -187,9 +189,15 @@ void CheckoutWatch::lookBeforeMerge(const git_oid *theirs)
                          {
                              found = ask(mergeRules, copy, change);
                              merged_.noteChange(copy, change);
+                             yielding = firstOf(yielding, findYielding(copy, change));
+                             mayBeRenamed = mayBeRenamed || isDeletedByBoth(copy, change);
                              return !found;
                          });
         first = firstOf(first, found);
+    }
+    if (mayBeRenamed)
+    {
+        first = firstOf(first, yielding);
     }
     if (first)
     {

@@ -201,6 +201,23 @@ Finding findUntracked(WorkingCopy &copy, const TreeChange &change)
     return inTheWay(change.path, standing);
 }
 
+Finding findYielding(WorkingCopy &copy, const TreeChange &change)
+{
+    if (change.before != nullptr || !makesFile(change) || copy.entryOf(change.path) != nullptr)
+    {
+        return {};
+    }
+    const Finding above = findBlockedWay(copy, change);
+    const bool isLink = !above && copy.at(change.path) == Standing::Link;
+    return isLink ? inTheWay(change.path, Standing::Link) : above;
+}
+
+bool isDeletedByBoth(WorkingCopy &copy, const TreeChange &change)
+{
+    return change.before != nullptr && !isGitlink(change.before) && change.after == nullptr &&
+           copy.entryOf(change.path) == nullptr;
+}
+
 Finding findHiddenEdit(WorkingCopy &copy)
 {
     const std::size_t count = git_index_entrycount(copy.index());

@@ -58,6 +58,12 @@ Finding findUntracked(WorkingCopy &copy, const TreeChange &change);
 /// if the working tree has a name that libgit2 sorts between the submodule and its folder: it then
 /// deletes the folder, or does not see the change.
 Finding findSubmoduleAfterSibling(WorkingCopy &copy, const TreeChange &change);
+/// What gives way to a new file as long as libgit2 tells of it before it writes: an ignored link in
+/// its place, an ignored link or file above. For changes that the other rules of a merge let pass.
+Finding findYielding(WorkingCopy &copy, const TreeChange &change);
+/// Whether neither side has the file any more. Theirs may have renamed it: then it is in conflict,
+/// and libgit2 writes the file of the new name without telling of it.
+bool isDeletedByBoth(WorkingCopy &copy, const TreeChange &change);
 /// The first file with a change that Git hides, since the file is marked skip-worktree or
 /// assume-unchanged. A merge would undo it, whether the other side touches the file or not.
 Finding findHiddenEdit(WorkingCopy &copy);

@@ -366,6 +366,39 @@ TEST_F(MergeObstacles, AreIgnoredLinksAboveAConflict)
     expectConflictsAsGit({"1 d/f", "3 d/f"});
 }
 
+/// Also of a file that they have given another name, which no change of theirs tells.
+TEST_F(MergeObstacles, AreIgnoredLinksWhereTheyRenamedWhatWeDeleted)
+{
+    diverge([this] { repository_.remove("file"); },
+            [this]
+            {
+                repository_.makeFolder("n");
+                moving("file", "n/f")();
+            });
+    repository_.write(".git/info/exclude", "/n\n");
+    repository_.symlink("../outside", "n");
+    expectMergeRefused(inTheWay("symbolic link 'n'"));
+    repository_.remove("n");
+    repository_.write("n", "ignored\n");
+    expectMergeRefused(inTheWay("untracked file 'n'"));
+    repository_.remove("n");
+    repository_.symlink("../../outside/f", "n/f");
+    expectMergeRefused(inTheWay("symbolic link 'n/f'"));
+    expectNothingOutsideChanged();
+    repository_.remove("n");
+    expectConflicts("topic");
+    EXPECT_THAT(conflicts(), ElementsAre("1 file", "3 n/f"));
+}
+
+TEST_F(MergeObstacles, AreNotIgnoredLinksBesideAFileThatBothDeleted)
+{
+    const auto remove = [this] { repository_.remove("d/f"); };
+    diverge([&] { remove(); }, [&] { remove(); });
+    repository_.write(".git/info/exclude", "/ignored\n");
+    repository_.symlink("../outside/new", "ignored");
+    expectCleanAsGit();
+}
+
 TEST_F(MergeObstacles, AreLinksAboveAConflict)
 {
     diverge([this] { repository_.remove("d"); }, writing("d/f", "theirs\n"));
