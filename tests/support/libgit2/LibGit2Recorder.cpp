@@ -81,8 +81,10 @@ void Passing::setError()
 
 void Passing::leaveText() const
 {
-    // libgit2 looks at what is left in a callback. After its end nothing can be left.
-    if (depth > 1 || function_ == std::string_view("git_libgit2_shutdown"))
+    const std::string_view name = function_;
+    // libgit2 looks at what is left in a callback. After its end nothing can be left. What making a
+    // commit leaves is all that tells of a full disk.
+    if (depth > 1 || name == "git_libgit2_shutdown" || name == "git_commit_create")
         return;
     const Unseen unseen;
     const git_error *const error = git_error_last();
