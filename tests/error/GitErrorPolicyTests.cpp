@@ -16,6 +16,7 @@
 #include "error/errorUtil/libgit2Errors.hpp"
 #include "error/logging/severity.hpp"
 #include "error/makeError.hpp"
+#include "support/Failure.hpp"
 #include "support/LogCapture.hpp"
 #include "support/isRecord.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
@@ -25,6 +26,8 @@ namespace vclink::git
 namespace
 {
 
+using test::Failure;
+using test::failureOf;
 using test::HermeticLibGit2;
 using test::isRecord;
 using test::LogCapture;
@@ -81,17 +84,8 @@ TEST_F(ThrowIfError, ThrowsTheFailureAfterItsRecord)
                                      "no such r\xC3\xA9"
                                      "ference");
     const LogCapture log(SeverityDiagnostic);
-    try
-    {
-        GitErrorPolicy::throwIfError(error);
-        ADD_FAILURE() << "nothing was raised";
-    }
-    catch (const LibGit2Exception &exception)
-    {
-        EXPECT_EQ(exception.getError().getCode(), -3);
-        EXPECT_EQ(exception.getError().getErrorClass(), GIT_ERROR_REFERENCE);
-        EXPECT_EQ(exception.getError().getMessage(), u"no such r\u00E9ference");
-    }
+    EXPECT_EQ(failureOf([&] { GitErrorPolicy::throwIfError(error); }),
+              (Failure{-3, GIT_ERROR_REFERENCE, "no such r\u00E9ference"}));
     EXPECT_THAT(log.messages(), ElementsAre("Throwing error no such r\xC3\xA9"
                                             "ference (-3)"));
 }
@@ -184,16 +178,8 @@ TEST_F(ThrowIfError, ThrowsTheOrdinaryFailureWhenTheSlotIsEmpty)
 {
     const GitError error = makeError(GIT_EUSER, GIT_ERROR_CALLBACK, "stopped");
     const LogCapture log(SeverityDiagnostic);
-    try
-    {
-        GitErrorPolicy::throwIfError(error);
-        ADD_FAILURE() << "nothing was raised";
-    }
-    catch (const LibGit2Exception &exception)
-    {
-        EXPECT_EQ(exception.getError().getCode(), -7);
-        EXPECT_EQ(exception.getError().getMessage(), u"stopped");
-    }
+    EXPECT_EQ(failureOf([&] { GitErrorPolicy::throwIfError(error); }),
+              (Failure{-7, GIT_ERROR_CALLBACK, "stopped"}));
     EXPECT_THAT(log.messages(),
                 ElementsAre("Re-throwing error from callback", "Throwing error stopped (-7)"));
 }

@@ -13,6 +13,7 @@
 #include "error/HermeticLibGit2.hpp"
 #include "error/errorUtil/libgit2Errors.hpp"
 #include "error/logging/severity.hpp"
+#include "support/Failure.hpp"
 #include "support/LogCapture.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
 
@@ -21,6 +22,8 @@ namespace vclink::git
 namespace
 {
 
+using test::Failure;
+using test::failureOf;
 using test::HermeticLibGit2;
 using test::LogCapture;
 using testing::ElementsAre;
@@ -151,17 +154,8 @@ TEST(GitResult, OfAFailureRaisesItWhenAskedForItsValue)
     git_error_set_str(GIT_ERROR_INDEX, "locked");
     const GitResult<void> result = makeResult(GIT_ELOCKED);
     git_error_clear();
-    try
-    {
-        result.value();
-        ADD_FAILURE() << "nothing was raised";
-    }
-    catch (const LibGit2Exception &exception)
-    {
-        EXPECT_EQ(exception.getError().getCode(), GIT_ELOCKED);
-        EXPECT_EQ(exception.getError().getErrorClass(), GIT_ERROR_INDEX);
-        EXPECT_EQ(exception.getError().getMessage(), u"locked");
-    }
+    EXPECT_EQ(failureOf([&] { result.value(); }),
+              (Failure{GIT_ELOCKED, GIT_ERROR_INDEX, "locked"}));
 }
 
 TEST(GitCheck, RaisesTheFailureOfItsCall)
@@ -169,16 +163,9 @@ TEST(GitCheck, RaisesTheFailureOfItsCall)
     const HermeticLibGit2 libgit2;
     const char *const none = nullptr;
     EXPECT_NO_THROW(check(answerWith, 0, none));
-    try
-    {
-        check(answerWith, GIT_ELOCKED, "locked");
-        ADD_FAILURE() << "nothing was raised";
-    }
-    catch (const LibGit2Exception &exception)
-    {
-        EXPECT_EQ(exception.getError().getCode(), GIT_ELOCKED);
-        EXPECT_EQ(exception.getError().getMessage(), u"locked");
-    }
+    const auto failure = failureOf([&] { check(answerWith, GIT_ELOCKED, "locked"); });
+    EXPECT_EQ(failure.code, GIT_ELOCKED);
+    EXPECT_EQ(failure.text, "locked");
 }
 
 TEST(GitCheck, LeavesASuccessAloneAndRaisesAFailureThatIsThereAlready)

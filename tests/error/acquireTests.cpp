@@ -12,13 +12,14 @@
 #include "error/HermeticLibGit2.hpp"
 #include "error/errorUtil/GitResult.hpp"
 #include "error/errorUtil/libgit2Errors.hpp"
-#include "vclink/git/LibGit2Exception.hpp"
+#include "support/Failure.hpp"
 
 namespace vclink::git
 {
 namespace
 {
 
+using test::failureOf;
 using test::HermeticLibGit2;
 using testing::ElementsAre;
 using testing::IsEmpty;
@@ -137,17 +138,13 @@ TEST_F(Acquire, HasNoTextOfAnEarlierCall)
 TEST_F(Acquire, ReleasesHandlesInReverseOrderWhenAnExceptionPasses)
 {
     const std::string path = libgit2.folder().path();
-    try
+    const auto openThree = [&]
     {
         const OwnedHandle<git_odb> one = acquire<git_odb>(openStore, 0, "one").value();
         const OwnedHandle<git_odb> two = acquire<git_odb>(openStore, 0, "two").value();
         acquire<git_repository>(git_repository_open, path.c_str()).value();
-        ADD_FAILURE() << "nothing was raised";
-    }
-    catch (const LibGit2Exception &exception)
-    {
-        EXPECT_EQ(exception.getError().getCode(), GIT_ENOTFOUND);
-    }
+    };
+    EXPECT_EQ(failureOf(openThree).code, GIT_ENOTFOUND);
     EXPECT_THAT(releasedStores, ElementsAre("two", "one"));
 }
 

@@ -13,13 +13,13 @@
 #include <sys/stat.h>
 
 #include "support/Descriptors.hpp"
+#include "support/Failure.hpp"
 #include "support/GitTest.hpp"
 #include "support/LibGit2Session.hpp"
 #include "support/UnprivilegedUser.hpp"
 #include "support/text.hpp"
 #include "util/lock/IndexLock.hpp"
 #include "util/repository/repository.hpp"
-#include "vclink/git/LibGit2Exception.hpp"
 
 namespace
 {
@@ -31,6 +31,8 @@ using testing::ElementsAre;
 using testing::HasSubstr;
 using testing::UnorderedElementsAre;
 using vclink::test::asPath;
+using vclink::test::Failure;
+using vclink::test::failureOf;
 using vclink::test::GitRepository;
 
 struct stat statusOf(const fs::path &file)
@@ -39,20 +41,6 @@ struct stat statusOf(const fs::path &file)
     if (::lstat(file.c_str(), &status) != 0)
         throw std::runtime_error("no " + file.string());
     return status;
-}
-
-/// What was raised; a success is code 0.
-template <class Action> git::GitError lockErrorOf(Action action)
-{
-    try
-    {
-        action();
-    }
-    catch (const git::LibGit2Exception &exception)
-    {
-        return exception.getError();
-    }
-    return {};
 }
 
 class IndexLockTest : public vclink::test::GitTest
@@ -68,6 +56,10 @@ class IndexLockTest : public vclink::test::GitTest
     static git::OwnedHandle<git_repository> open(const GitRepository &repository)
     {
         return git::openRepository(asPath(repository.path()));
+    }
+    static Failure failureToLock(git_repository *repository)
+    {
+        return failureOf([&] { static_cast<void>(IndexLock(repository)); });
     }
     /// Puts the file into the repository's index, and writes that.
     static void stage(git_repository *repository, const std::string &name)
@@ -178,12 +170,10 @@ TEST_F(IndexLockTest, IsRefusedWhereAnotherStands)
 {
     repository_.write(".git/index.lock", "of another process");
     const auto opened = open(repository_);
-    const git::GitError error = lockErrorOf([&] { static_cast<void>(IndexLock(opened.get())); });
-    EXPECT_EQ(error.getCode(), GIT_ELOCKED);
-    EXPECT_EQ(error.getErrorClass(), GIT_ERROR_INDEX);
-    EXPECT_EQ(vclink::test::asUtf8(error.getMessage()),
-              "the index is locked by '" + (repository_ / ".git/index.lock").string() +
-                  "'; this might be due to a concurrent or crashed process");
+    EXPECT_EQ(failureToLock(opened.get()),
+              (Failure{GIT_ELOCKED, GIT_ERROR_INDEX,
+                       "the index is locked by '" + (repository_ / ".git/index.lock").string() +
+                           "'; this might be due to a concurrent or crashed process"}));
     EXPECT_EQ(repository_.read(".git/index.lock"), "of another process");
     EXPECT_THAT(indexFiles(), UnorderedElementsAre("index", "index.lock"));
 }
@@ -193,8 +183,7 @@ TEST_F(IndexLockTest, IsRefusedWhileThisProcessHoldsIt)
     const auto opened = open(repository_);
     const IndexLock lock(opened.get());
     const auto second = open(repository_);
-    EXPECT_EQ(lockErrorOf([&] { static_cast<void>(IndexLock(second.get())); }).getCode(),
-              GIT_ELOCKED);
+    EXPECT_EQ(failureToLock(second.get()).code, GIT_ELOCKED);
     EXPECT_THAT(indexFiles(), UnorderedElementsAre("index", "index.lock", "index.vclink"));
 }
 
@@ -334,9 +323,7 @@ TEST_F(IndexLockTest, EndsAtALinkThatLeadsToItself)
     const auto opened = open(repository_);
     repository_.remove(".git/index");
     repository_.symlink("index", ".git/index");
-    EXPECT_THAT(vclink::test::asUtf8(
-                    lockErrorOf([&] { static_cast<void>(IndexLock(opened.get())); }).getMessage()),
-                HasSubstr("Too many levels of symbolic links"));
+    EXPECT_THAT(failureToLock(opened.get()).text, HasSubstr("Too many levels of symbolic links"));
     EXPECT_THAT(indexFiles(), ElementsAre("index"));
 }
 
@@ -354,7 +341,7 @@ TEST_F(IndexLockTest, TakesNoNoticeOfWhatAKilledProcessLeft)
     repository_.write(".git/index.vclink", "half of an index");
     repository_.remove(".git/index");
     const auto fresh = open(repository_);
-    EXPECT_EQ(lockErrorOf([&] { static_cast<void>(IndexLock(fresh.get())); }).getCode(), 0);
+    EXPECT_NO_THROW(static_cast<void>(IndexLock(fresh.get())));
     EXPECT_THAT(indexFiles(), ElementsAre());
 }
 
@@ -363,8 +350,7 @@ TEST_F(IndexLockTest, IsGivenUpWhereTheIndexCannotBeRead)
     const std::string broken = "this is no index, and long enough to be told from an empty one";
     repository_.write(".git/index", broken);
     const auto opened = open(repository_);
-    EXPECT_EQ(lockErrorOf([&] { static_cast<void>(IndexLock(opened.get())); }).getErrorClass(),
-              GIT_ERROR_INDEX);
+    EXPECT_EQ(failureToLock(opened.get()).errorClass, GIT_ERROR_INDEX);
     EXPECT_THAT(indexFiles(), ElementsAre("index"));
     EXPECT_EQ(repository_.read(".git/index"), broken);
 }
@@ -377,8 +363,7 @@ TEST_F(IndexLockTest, IsGivenUpWhereTheIndexMayNotBeRead)
         [&]
         {
             const auto opened = open(repository_);
-            const auto error = lockErrorOf([&] { static_cast<void>(IndexLock(opened.get())); });
-            return vclink::test::asUtf8(error.getMessage());
+            return failureToLock(opened.get()).text;
         });
     EXPECT_EQ(text, "failed to read index: '" + (repository_ / ".git/index").string() +
                         "': Permission denied");
@@ -427,7 +412,7 @@ TEST_F(IndexLockTest, LeavesNoDescriptorOpenAndHandsNoneOn)
         }
     }
     repository_.write(".git/index", "no index");
-    lockErrorOf([&] { static_cast<void>(IndexLock(opened.get())); });
+    failureToLock(opened.get());
 }
 
 } // namespace

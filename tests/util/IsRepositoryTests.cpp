@@ -6,6 +6,7 @@
 #include <gtest/gtest.h>
 
 #include "support/Descriptors.hpp"
+#include "support/Failure.hpp"
 #include "support/GitTest.hpp"
 #include "support/LibGit2Session.hpp"
 #include "support/text.hpp"
@@ -48,17 +49,11 @@ TEST_F(IsRepository, RaisesWhatElseLibGit2Says)
 {
     const auto repository = makeRepository();
     repository.write("broken/.git", "neither a folder nor a link");
-    try
-    {
-        isRepository(asPath(repository / "broken"));
-        FAIL() << "no exception";
-    }
-    catch (const LibGit2Exception &exception)
-    {
-        EXPECT_EQ(exception.getError().getCode(), GIT_ERROR);
-        EXPECT_EQ(exception.getError().getErrorClass(), GIT_ERROR_REPOSITORY);
-        EXPECT_NE(exception.getError().getMessage(), u"");
-    }
+    const auto failure =
+        vclink::test::failureOf([&] { isRepository(asPath(repository / "broken")); });
+    EXPECT_EQ(failure.code, GIT_ERROR);
+    EXPECT_EQ(failure.errorClass, GIT_ERROR_REPOSITORY);
+    EXPECT_NE(failure.text, "");
 }
 
 /// Nothing but the folder's layout is looked at; the first operation meets the rest.

@@ -97,38 +97,16 @@ TEST_F(LookupCommitByName, PrefersTheTagToTheBranchOfTheSameName)
     EXPECT_EQ(idOf("name"), first);
 }
 
-TEST_F(LookupCommitByName, KeepsTheFailureOfAMissingName)
-{
-    repository_.commit("first");
-    EXPECT_EQ(errorOf("missing"), GIT_ENOTFOUND);
-    EXPECT_EQ(errorOf("refs/heads/missing"), GIT_ENOTFOUND);
-}
-
-TEST_F(LookupCommitByName, KeepsTheFailureOfANameThatIsNone)
-{
-    EXPECT_EQ(errorOf("not a name.."), GIT_EINVALIDSPEC);
-}
-
-TEST_F(LookupCommitByName, KeepsTheFailureOfARevisionThatIsNoReference)
+TEST_F(LookupCommitByName, KeepsTheFailureOfWhatIsNoReferenceToACommit)
 {
     const std::string id = repository_.commit("first");
-    EXPECT_EQ(errorOf(id.c_str()), GIT_ENOTFOUND);
-    EXPECT_NE(errorOf("HEAD~0"), 0);
-}
-
-TEST_F(LookupCommitByName, KeepsTheFailureOfAnAnnotatedTag)
-{
-    repository_.commit("first");
     repository_.git({"-c", "user.name=T", "-c", "user.email=t@example.com", "tag", "-a", "-m",
                      "text", "annotated"});
-    EXPECT_EQ(errorOf("annotated"), GIT_ENOTFOUND);
-}
-
-TEST_F(LookupCommitByName, KeepsTheFailureOfABrokenReference)
-{
-    repository_.commit("first");
     repository_.write(".git/refs/heads/broken", std::string(40, '1') + "\n");
-    EXPECT_EQ(errorOf("broken"), GIT_ENOTFOUND);
+    for (const auto *name : {"missing", "refs/heads/missing", id.c_str(), "annotated", "broken"})
+        EXPECT_EQ(errorOf(name), GIT_ENOTFOUND) << name;
+    EXPECT_EQ(errorOf("not a name.."), GIT_EINVALIDSPEC);
+    EXPECT_NE(errorOf("HEAD~0"), 0);
 }
 
 TEST_F(LookupCommitByName, LeavesNothingOpen)

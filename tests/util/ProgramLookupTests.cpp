@@ -3,6 +3,7 @@
 #include <cerrno>
 #include <cstdlib>
 #include <filesystem>
+#include <map>
 #include <string>
 #include <system_error>
 #include <vector>
@@ -21,21 +22,6 @@ namespace fs = std::filesystem;
 using testing::ElementsAre;
 using vclink::test::WorkingFolder;
 
-/// What stands under the name "tool" in a folder of the lookup's.
-enum class LookupKind
-{
-    Program,
-    PlainFile,
-    Folder
-};
-
-struct LookupEntry
-{
-    const char *folder; ///< below the fixture's; "here" is the working folder
-    LookupKind kind;
-    int status; ///< with which the program ends
-};
-
 class ProgramLookup : public vclink::test::RunCommandTest
 {
   protected:
@@ -44,17 +30,17 @@ class ProgramLookup : public vclink::test::RunCommandTest
         fs::create_directories(folder() / "here");
     }
 
-    void place(const LookupEntry &entry)
+    /// Puts something called "tool" into a folder below the fixture's; "here" is the working
+    /// folder.
+    /// @param kind "folder", "file", or the status with which a program ends
+    void place(const std::string &name, const std::string &kind)
     {
-        const fs::path path = folder() / entry.folder / "tool";
-        fs::create_directories(path.parent_path());
-        if (entry.kind == LookupKind::Folder)
-        {
-            fs::create_directory(path);
+        const fs::path path = folder() / name / "tool";
+        fs::create_directories(kind == "folder" ? path : path.parent_path());
+        if (kind == "folder")
             return;
-        }
-        fs::copy(scripts_.shell("exit " + std::to_string(entry.status)), path);
-        if (entry.kind == LookupKind::PlainFile)
+        fs::copy(scripts_.shell("exit " + (kind == "file" ? "99" : kind)), path);
+        if (kind == "file")
             fs::permissions(path, fs::perms::owner_read | fs::perms::owner_write);
     }
 
@@ -85,123 +71,54 @@ class ProgramLookup : public vclink::test::RunCommandTest
 struct LookupRow
 {
     const char *what;
-    std::vector<LookupEntry> entries;
+    std::map<std::string, std::string> placed; ///< what, by folder
     const char *path;
-    int status; ///< of the program that runs, or 0
-    int error;  ///< or this one
+    int status; ///< of the program that runs, which is never 99
+    int error = 0;
 };
-
-/// The status of a program that the lookup must not choose.
-constexpr int wrongStatus = 99;
 
 const std::vector<LookupRow> &lookupRows()
 {
     static const std::vector<LookupRow> table{
-        {"the first folder of PATH", {{"a", LookupKind::Program, 1}}, "@/a:@/b", 1, 0},
-        {"the only folder of PATH", {{"a", LookupKind::Program, 1}}, "@/a", 1, 0},
-        {"a later folder of PATH", {{"b", LookupKind::Program, 2}}, "@/a:@/b", 2, 0},
-        {"the first of two",
-         {{"a", LookupKind::Program, 1}, {"b", LookupKind::Program, wrongStatus}},
-         "@/a:@/b",
-         1,
-         0},
-        {"the second of three",
-         {{"b", LookupKind::Program, 2}, {"c", LookupKind::Program, wrongStatus}},
-         "@/a:@/b:@/c",
-         2,
-         0},
-        {"not the working folder",
-         {{"here", LookupKind::Program, wrongStatus}, {"b", LookupKind::Program, 2}},
-         "@/a:@/b",
-         2,
-         0},
-        {"not the working folder, with nothing in PATH",
-         {{"here", LookupKind::Program, wrongStatus}},
-         "@/a:@/b",
-         0,
-         ENOENT},
-        {"not a folder of the working folder",
-         {{"here", LookupKind::Folder, wrongStatus}, {"b", LookupKind::Program, 2}},
-         "@/a:@/b",
-         2,
-         0},
+        {"the first folder of PATH", {{"a", "1"}}, "@/a:@/b", 1},
+        {"the only folder of PATH", {{"a", "1"}}, "@/a", 1},
+        {"a later folder of PATH", {{"b", "2"}}, "@/a:@/b", 2},
+        {"the first of two", {{"a", "1"}, {"b", "99"}}, "@/a:@/b", 1},
+        {"the second of three", {{"b", "2"}, {"c", "99"}}, "@/a:@/b:@/c", 2},
+        {"not the working folder", {{"here", "99"}, {"b", "2"}}, "@/a:@/b", 2},
+        {"not the working folder, with nothing in PATH", {{"here", "99"}}, "@/a:@/b", -1, ENOENT},
+        {"not a folder of the working folder", {{"here", "folder"}, {"b", "2"}}, "@/a:@/b", 2},
         {"not what lies in a folder named like the variable",
-         {{"here/PATH=a", LookupKind::Program, wrongStatus}, {"b", LookupKind::Program, 2}},
+         {{"here/PATH=a", "99"}, {"b", "2"}},
          "a:@/b",
-         2,
-         0},
-        {"the working folder, by an empty first element",
-         {{"here", LookupKind::Program, 3}, {"b", LookupKind::Program, wrongStatus}},
-         ":@/b",
-         3,
-         0},
+         2},
+        {"the working folder, by an empty first element", {{"here", "3"}, {"b", "99"}}, ":@/b", 3},
         {"the working folder, by an empty element in the middle",
-         {{"here", LookupKind::Program, 3}, {"b", LookupKind::Program, wrongStatus}},
+         {{"here", "3"}, {"b", "99"}},
          "@/a::@/b",
-         3,
-         0},
-        {"the working folder, by an empty last element",
-         {{"here", LookupKind::Program, 3}},
-         "@/a:",
-         3,
-         0},
-        {"the working folder, by an empty PATH", {{"here", LookupKind::Program, 3}}, "", 3, 0},
-        {"the working folder, by a dot", {{"here", LookupKind::Program, 3}}, "@/a:.", 3, 0},
-        {"a folder before an empty element",
-         {{"here", LookupKind::Program, wrongStatus}, {"a", LookupKind::Program, 1}},
-         "@/a:",
-         1,
-         0},
-        {"a relative folder", {{"here/bin", LookupKind::Program, 4}}, "@/a:bin", 4, 0},
-        {"a relative first folder", {{"here/bin", LookupKind::Program, 4}}, "bin:@/a", 4, 0},
-        {"a folder with blanks", {{"a b  c", LookupKind::Program, 5}}, "@/a b  c:@/b", 5, 0},
-        {"a later folder with blanks", {{"a b", LookupKind::Program, 5}}, "@/a:@/a b", 5, 0},
-        {"a folder with a double quote",
-         {{"a\"b", LookupKind::Program, wrongStatus}},
-         "@/a\"b",
-         0,
-         EINVAL},
-        {"a later folder with a double quote",
-         {{"a\"b", LookupKind::Program, 5}},
-         "@/b:@/a\"b",
-         5,
-         0},
-        {"not a folder of that name",
-         {{"a", LookupKind::Folder, wrongStatus}, {"b", LookupKind::Program, 2}},
-         "@/a:@/b",
-         2,
-         0},
-        {"not a later folder of that name",
-         {{"b", LookupKind::Folder, wrongStatus}, {"c", LookupKind::Program, 2}},
-         "@/a:@/b:@/c",
-         2,
-         0},
-        {"nothing but a folder of that name",
-         {{"b", LookupKind::Folder, wrongStatus}},
-         "@/a:@/b",
-         0,
-         EACCES},
-        {"not a file that may not be executed",
-         {{"a", LookupKind::PlainFile, wrongStatus}, {"b", LookupKind::Program, 2}},
-         "@/a:@/b",
-         2,
-         0},
-        {"nothing but a file that may not be executed",
-         {{"a", LookupKind::PlainFile, wrongStatus}},
-         "@/a:@/b",
-         0,
-         EACCES},
+         3},
+        {"the working folder, by an empty last element", {{"here", "3"}}, "@/a:", 3},
+        {"the working folder, by an empty PATH", {{"here", "3"}}, "", 3},
+        {"the working folder, by a dot", {{"here", "3"}}, "@/a:.", 3},
+        {"a folder before an empty element", {{"here", "99"}, {"a", "1"}}, "@/a:", 1},
+        {"a relative folder", {{"here/bin", "4"}}, "@/a:bin", 4},
+        {"a relative first folder", {{"here/bin", "4"}}, "bin:@/a", 4},
+        {"a folder with blanks", {{"a b  c", "5"}}, "@/a b  c:@/b", 5},
+        {"a later folder with blanks", {{"a b", "5"}}, "@/a:@/a b", 5},
+        {"a folder with a double quote", {{"a\"b", "99"}}, "@/a\"b", -1, EINVAL},
+        {"a later folder with a double quote", {{"a\"b", "5"}}, "@/b:@/a\"b", 5},
+        {"not a folder of that name", {{"a", "folder"}, {"b", "2"}}, "@/a:@/b", 2},
+        {"not a later folder of that name", {{"b", "folder"}, {"c", "2"}}, "@/a:@/b:@/c", 2},
+        {"nothing but a folder of that name", {{"b", "folder"}}, "@/a:@/b", -1, EACCES},
+        {"not a file that may not be executed", {{"a", "file"}, {"b", "2"}}, "@/a:@/b", 2},
+        {"nothing but a file that may not be executed", {{"a", "file"}}, "@/a:@/b", -1, EACCES},
         {"not a file of the working folder that may not be executed",
-         {{"here", LookupKind::PlainFile, wrongStatus}, {"b", LookupKind::Program, 2}},
+         {{"here", "file"}, {"b", "2"}},
          "@/a:@/b",
-         2,
-         0},
-        {"not an element that is a file",
-         {{"a", LookupKind::PlainFile, wrongStatus}, {"b", LookupKind::Program, 2}},
-         "@/a/tool:@/b",
-         2,
-         0},
-        {"nothing", {}, "@/a:@/b", 0, ENOENT}};
+         2},
+        {"not an element that is a file", {{"a", "file"}, {"b", "2"}}, "@/a/tool:@/b", 2},
+        {"nothing", {}, "@/a:@/b", -1, ENOENT},
+    };
     return table;
 }
 
@@ -209,24 +126,24 @@ TEST_F(ProgramLookup, IsThatOfExecvpe)
 {
     for (const LookupRow &row : lookupRows())
     {
-        for (const LookupEntry &entry : row.entries)
-            place(entry);
+        for (const auto &[name, kind] : row.placed)
+            place(name, kind);
         setPath(row.path);
         {
             const WorkingFolder there(folder() / "here");
             const auto outcome = run("tool x");
             EXPECT_EQ(outcome.error.value(), row.error) << row.what;
-            EXPECT_EQ(outcome.result, row.error == 0 ? row.status : -1) << row.what;
+            EXPECT_EQ(outcome.result, row.status) << row.what;
         }
-        for (const LookupEntry &entry : row.entries)
-            fs::remove_all(folder() / entry.folder);
+        for (const auto &[name, kind] : row.placed)
+            fs::remove_all(folder() / name);
         fs::create_directories(folder() / "here");
     }
 }
 
 TEST_F(ProgramLookup, TakesTheSystemsFoldersWherePathIsNotSet)
 {
-    place({"here", LookupKind::Program, wrongStatus});
+    place("here", "99");
     ::unsetenv("PATH");
     EXPECT_EQ(named("true"), "/bin/true");
     const WorkingFolder there(folder() / "here");
@@ -243,7 +160,7 @@ TEST_F(ProgramLookup, FindsNoNameThatIsTooLongOrEmpty)
 
 TEST_F(ProgramLookup, EndsAtAFolderThatCannotBeLookedInto)
 {
-    place({"b", LookupKind::Program, wrongStatus});
+    place("b", "99");
     fs::create_directory_symlink("loop", folder() / "loop");
     setPath("@/a:@/loop:@/b");
     EXPECT_EQ(errorOf("tool"), ELOOP);
@@ -251,8 +168,8 @@ TEST_F(ProgramLookup, EndsAtAFolderThatCannotBeLookedInto)
 
 TEST_F(ProgramLookup, ChangesNothingWhereBoostProcessTakesTheSame)
 {
-    place({"b", LookupKind::Program, 1});
-    place({"here", LookupKind::PlainFile, wrongStatus});
+    place("b", "1");
+    place("here", "file");
     setPath("@/a:@/b");
     for (const char *command : {"tool", " tool  x ", "\"tool\" \"a b\"", "tool \\\"x\\\""})
         EXPECT_EQ(named(command), command);
@@ -260,7 +177,7 @@ TEST_F(ProgramLookup, ChangesNothingWhereBoostProcessTakesTheSame)
 
 TEST_F(ProgramLookup, ChangesNoNameWithASlash)
 {
-    place({"here", LookupKind::Program, 1});
+    place("here", "1");
     setPath("@/a:@/b");
     for (const char *command : {"./tool", "/nowhere/tool x", "\"a b/tool\" x", "here/", "/"})
         EXPECT_EQ(named(command), command);
@@ -268,12 +185,12 @@ TEST_F(ProgramLookup, ChangesNoNameWithASlash)
 
 TEST_F(ProgramLookup, PutsThePathInTheNamesPlace)
 {
-    place({"a b", LookupKind::Program, 1});
+    place("a b", "1");
     setPath("@/a b:@/b");
     const std::string path = folder().path().string() + "/a b/tool";
     EXPECT_EQ(named("tool"), '"' + path + '"');
     EXPECT_EQ(named("  \"tool\" \"x y\" z "), "  \"" + path + "\" \"x y\" z ");
-    place({"c", LookupKind::Program, 1});
+    place("c", "1");
     setPath("@/c:@/b");
     EXPECT_EQ(named(" \"tool\"  x"), ' ' + folder().path().string() + "/c/tool  x");
 }
@@ -291,7 +208,7 @@ TEST_F(ProgramLookup, HandsTheOtherWordsOverAsTheyAre)
 
 TEST_F(ProgramLookup, LeavesTheRecordOfTheCommandAsItIs)
 {
-    place({"a", LookupKind::Program, 1});
+    place("a", "1");
     setPath("@/a:@/b");
     EXPECT_THAT(recordsOf("tool x"), ElementsAre("Command: tool x", "Output:\n"));
     EXPECT_THAT(recordsOf("no-such-tool"), ElementsAre("Command: no-such-tool"));

@@ -3,6 +3,7 @@
 #include <cstddef>
 #include <filesystem>
 #include <random>
+#include <sstream>
 #include <string>
 #include <vector>
 
@@ -134,55 +135,35 @@ TEST_F(RelativeToRoot, GivesAnEmptyTextWhereTheTwoCannotBeRelated)
     EXPECT_EQ(asUtf8(relativeToRoot(upath(), asPath(at("root/file")))), "");
 }
 
+/// Paths of every kind.
+std::vector<std::string> shapes()
+{
+    std::vector<std::string> paths;
+    std::istringstream list(
+        "|root|root/|root/.|root/..|root/file|root//file|root/./file|root/sub/|root/sub/.|"
+        "root/sub//|root/sub/../file|root/sub/dir/file|root/sub/missing/deep|root/missing/|"
+        "root/missing/.|root/missing/..|root/missing/../file|root/missing/./x/..|root/tofile|"
+        "root/tofolder|root/tofolder/|root/tofolder/../file|root/tofolder/missing|root/dangling|"
+        "root/dangling/x|root/danglingbelow|root/danglingbelow/x|root/out|root/out/file|"
+        "root/out/../file|root/out/deep/../../root/file|root/x\\y|root/\xFF|"
+        "root/gr\xC3\xBC\xC3\x9F|root/file/x|link|link/file|link/../root/file|other|other/"
+        "roundabout|"
+        "other/roundabout/file|other/roundabout/dir/file|nowhere/at/all|nowhere/deep/..|root/ |"
+        "root/a b|root/*|root/...");
+    for (std::string path; std::getline(list, path, '|');)
+        paths.push_back(path);
+    return paths;
+}
+
 TEST_F(RelativeToRoot, AgreesWithItsDefinitionOnManyShapes)
 {
     const std::vector<std::string> roots{
         "root",  "root/",       "root//",        "root/.",  "root/sub",  "link",
         "link/", "link/sub/..", "other/../root", "missing", "root/file", "root/back\\slash"};
-    const std::vector<std::string> paths{"",
-                                         "root",
-                                         "root/",
-                                         "root/.",
-                                         "root/..",
-                                         "root/file",
-                                         "root//file",
-                                         "root/./file",
-                                         "root/sub/",
-                                         "root/sub/.",
-                                         "root/sub//",
-                                         "root/sub/../file",
-                                         "root/missing/",
-                                         "root/missing/.",
-                                         "root/missing/..",
-                                         "root/tofile",
-                                         "root/tofolder",
-                                         "root/tofolder/",
-                                         "root/tofolder/../file",
-                                         "root/dangling",
-                                         "root/dangling/x",
-                                         "root/danglingbelow",
-                                         "root/out",
-                                         "root/out/../file",
-                                         "root/out/deep/../../root/file",
-                                         "root/x\\y",
-                                         "root/\xFF",
-                                         "root/gr\xC3\xBC\xC3\x9F",
-                                         "root/file/x",
-                                         "link",
-                                         "link/file",
-                                         "link/../root/file",
-                                         "other",
-                                         "other/roundabout",
-                                         "other/roundabout/dir/file",
-                                         "nowhere/deep/..",
-                                         "root/ ",
-                                         "root/a b",
-                                         "root/*",
-                                         "root/..."};
     for (const auto &root : roots)
     {
         RootRelativePaths list(asPath(at(root)));
-        for (const auto &path : paths)
+        for (const auto &path : shapes())
         {
             const std::string expected = oracle(at(root), at(path));
             EXPECT_EQ(relative(root, path), expected) << root << " and " << path;
@@ -231,32 +212,14 @@ TEST_F(RelativeToRoot, AgreesWithItsDefinitionOnRandomPaths)
 /// The working folder of a process may be deleted, which is nothing to an absolute path.
 TEST_F(RelativeToRoot, NeedsNoWorkingFolderForAbsolutePaths)
 {
-    const std::vector<std::string> paths{"root",
-                                         "root/",
-                                         "root/.",
-                                         "root/file",
-                                         "root/sub/dir/file",
-                                         "root/sub/missing/deep",
-                                         "root/missing/",
-                                         "root/missing/../file",
-                                         "root/missing/./x/..",
-                                         "root/file/below",
-                                         "root/out/file",
-                                         "root/tofolder/missing",
-                                         "root/tofile",
-                                         "root/dangling",
-                                         "root/danglingbelow/x",
-                                         "root/x\\y",
-                                         "nowhere/at/all",
-                                         "other/roundabout/file"};
     for (const std::string root : {"root", "link", "root/sub", "root/missing", "nowhere/"})
     {
         std::vector<std::string> expected;
-        for (const std::string &path : paths)
+        for (const std::string &path : shapes())
             expected.push_back(relative(root, path));
         const vclink::test::NoWorkingFolder gone(folder().path());
-        for (std::size_t i = 0; i < paths.size(); ++i)
-            EXPECT_EQ(relative(root, paths[i]), expected[i]) << root << " and " << paths[i];
+        for (std::size_t i = 0; i < shapes().size(); ++i)
+            EXPECT_EQ(relative(root, shapes()[i]), expected[i]) << root << " and " << shapes()[i];
         EXPECT_THROW(relative(root, "root/loop"), boost::filesystem::filesystem_error);
         EXPECT_THROW(relative(root, "root/" + std::string(300, 'n')),
                      boost::filesystem::filesystem_error);

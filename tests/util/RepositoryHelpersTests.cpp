@@ -6,36 +6,23 @@
 #include <gtest/gtest.h>
 
 #include "support/Descriptors.hpp"
+#include "support/Failure.hpp"
 #include "support/GitTest.hpp"
 #include "support/LibGit2Session.hpp"
 #include "support/text.hpp"
 #include "util/repository/repository.hpp"
-#include "vclink/git/LibGit2Exception.hpp"
 
 namespace
 {
 
 namespace git = vclink::git;
 using vclink::test::asPath;
+using vclink::test::failureOf;
 using vclink::test::GitRepository;
 
 std::string asHex(const git_oid &id)
 {
     return git_oid_tostr_s(&id);
-}
-
-/// What was raised; a success is code 0.
-template <class Action> git::GitError raisedBy(Action action)
-{
-    try
-    {
-        action();
-    }
-    catch (const git::LibGit2Exception &exception)
-    {
-        return exception.getError();
-    }
-    return {};
 }
 
 class RepositoryHelpers : public vclink::test::GitTest
@@ -62,11 +49,10 @@ TEST_F(RepositoryHelpers, OpenNothingAboveTheFolder)
     const auto repository = makeRepository();
     repository.makeFolder("sub");
     const auto error =
-        raisedBy([&] { static_cast<void>(git::openRepository(asPath(repository / "sub"))); });
-    EXPECT_EQ(error.getCode(), GIT_ENOTFOUND);
-    EXPECT_EQ(error.getErrorClass(), GIT_ERROR_REPOSITORY);
-    EXPECT_NE(vclink::test::asUtf8(error.getMessage()).find("could not find repository"),
-              std::string::npos);
+        failureOf([&] { static_cast<void>(git::openRepository(asPath(repository / "sub"))); });
+    EXPECT_EQ(error.code, GIT_ENOTFOUND);
+    EXPECT_EQ(error.errorClass, GIT_ERROR_REPOSITORY);
+    EXPECT_NE(error.text.find("could not find repository"), std::string::npos);
 }
 
 TEST_F(RepositoryHelpers, OpenANewHandleEachTimeAndCloseIt)
@@ -78,8 +64,8 @@ TEST_F(RepositoryHelpers, OpenANewHandleEachTimeAndCloseIt)
     const auto second = open(repository);
     EXPECT_NE(first.get(), second.get());
     EXPECT_EQ(
-        raisedBy([&] { static_cast<void>(git::openRepository(asPath(folder() / "missing"))); })
-            .getCode(),
+        failureOf([&] { static_cast<void>(git::openRepository(asPath(folder() / "missing"))); })
+            .code,
         GIT_ENOTFOUND);
 }
 
@@ -100,9 +86,9 @@ TEST_F(RepositoryHelpers, RaiseForAnIndexThatCannotBeRead)
     repository.write(".git/index",
                      "this is no index, and long enough to be told from an empty one");
     const auto opened = open(repository);
-    const auto error = raisedBy([&] { static_cast<void>(git::getRepositoryIndex(opened.get())); });
-    EXPECT_EQ(error.getCode(), GIT_ERROR);
-    EXPECT_EQ(error.getErrorClass(), GIT_ERROR_INDEX);
+    const auto error = failureOf([&] { static_cast<void>(git::getRepositoryIndex(opened.get())); });
+    EXPECT_EQ(error.code, GIT_ERROR);
+    EXPECT_EQ(error.errorClass, GIT_ERROR_INDEX);
 }
 
 TEST_F(RepositoryHelpers, WriteTheIndex)
@@ -125,7 +111,7 @@ TEST_F(RepositoryHelpers, RaiseWhereTheIndexIsLocked)
     const auto opened = open(repository);
     const auto index = git::getRepositoryIndex(opened.get());
     ASSERT_EQ(git_index_add_bypath(index.get(), "file"), 0);
-    EXPECT_EQ(raisedBy([&] { git::writeIndex(index.get()); }).getCode(), GIT_ELOCKED);
+    EXPECT_EQ(failureOf([&] { git::writeIndex(index.get()); }).code, GIT_ELOCKED);
     EXPECT_TRUE(std::filesystem::exists(repository / ".git/index.lock"));
     EXPECT_FALSE(std::filesystem::exists(repository / ".git/index"));
 }
@@ -160,7 +146,7 @@ TEST_F(RepositoryHelpers, RaiseForATreeOfAnIndexInConflict)
     ASSERT_NE(repository.git({"ls-files", "--unmerged"}), "");
     const auto opened = open(repository);
     const auto index = git::getRepositoryIndex(opened.get());
-    EXPECT_EQ(raisedBy([&] { git::writeIndexTree(index.get()); }).getCode(), GIT_EUNMERGED);
+    EXPECT_EQ(failureOf([&] { git::writeIndexTree(index.get()); }).code, GIT_EUNMERGED);
 }
 
 TEST_F(RepositoryHelpers, LookATreeUp)
@@ -182,13 +168,12 @@ TEST_F(RepositoryHelpers, RaiseForAnIdThatIsNoTree)
     git_oid id;
     ASSERT_EQ(git_oid_fromstr(&id, repository.commit("first").c_str()), 0);
     const auto opened = open(repository);
-    EXPECT_EQ(raisedBy([&] { static_cast<void>(git::lookupTree(opened.get(), &id)); }).getCode(),
+    EXPECT_EQ(failureOf([&] { static_cast<void>(git::lookupTree(opened.get(), &id)); }).code,
               GIT_ENOTFOUND);
     git_oid missing;
     ASSERT_EQ(git_oid_fromstr(&missing, std::string(40, '1').c_str()), 0);
-    EXPECT_EQ(
-        raisedBy([&] { static_cast<void>(git::lookupTree(opened.get(), &missing)); }).getCode(),
-        GIT_ENOTFOUND);
+    EXPECT_EQ(failureOf([&] { static_cast<void>(git::lookupTree(opened.get(), &missing)); }).code,
+              GIT_ENOTFOUND);
 }
 
 } // namespace

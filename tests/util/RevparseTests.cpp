@@ -4,17 +4,18 @@
 #include <git2.h>
 #include <gtest/gtest.h>
 
+#include "support/Failure.hpp"
 #include "support/GitTest.hpp"
 #include "support/LibGit2Session.hpp"
 #include "support/text.hpp"
 #include "util/repository/repository.hpp"
-#include "vclink/git/LibGit2Exception.hpp"
 
 namespace
 {
 
 namespace git = vclink::git;
 using vclink::test::asPath;
+using vclink::test::failureOf;
 
 /// Too large for libgit2's cache of objects, which frees what it refuses at once.
 const std::string longText(9000, 'x');
@@ -114,15 +115,8 @@ TEST_F(Revparse, RaisesWithoutChangingTheIdGivenBefore)
 {
     const std::string expected = repository_.line({"rev-parse", "HEAD"});
     const git_oid *id = git::revparseId("HEAD", opened_.get());
-    try
-    {
-        git::revparseId("no-such-branch", opened_.get());
-        FAIL() << "no exception";
-    }
-    catch (const git::LibGit2Exception &exception)
-    {
-        EXPECT_EQ(exception.getError().getCode(), GIT_ENOTFOUND);
-    }
+    EXPECT_EQ(failureOf([&] { git::revparseId("no-such-branch", opened_.get()); }).code,
+              GIT_ENOTFOUND);
     EXPECT_EQ(git_oid_tostr_s(id), expected);
 }
 
