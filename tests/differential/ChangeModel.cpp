@@ -16,6 +16,8 @@ namespace vclink::test
 namespace
 {
 
+namespace fs = std::filesystem;
+
 bool isIndexed(const GitFile &file)
 {
     return file.unmerged || file.indexMode != noMode;
@@ -100,7 +102,7 @@ std::string ChangeModel::revert(const Names &names)
 
 std::string ChangeModel::markResolved(const std::string &name)
 {
-    if (std::filesystem::exists(repository_ / name))
+    if (fs::exists(repository_ / name))
     {
         stage(meantBy({name}, isChanged));
     }
@@ -209,9 +211,21 @@ void ChangeModel::run(const std::vector<std::string> &arguments, const Names &pa
     }
 }
 
+/// As `git add` does, also where a folder has taken the place of a file in conflict: that one
+/// `git update-index` refuses, which takes any other such file for deleted.
 void ChangeModel::stage(const Names &paths) const
 {
-    run({"update-index", "-z", "--add", "--remove", "--replace", "--stdin"}, paths);
+    Names gone;
+    Names others;
+    for (const auto &path : paths)
+    {
+        const auto file = report_.find(path);
+        const bool isUnmerged = file != report_.end() && file->second.unmerged;
+        const bool isFolder = fs::is_directory(fs::symlink_status(repository_ / path));
+        (isUnmerged && isFolder ? gone : others).push_back(path);
+    }
+    unstage(gone);
+    run({"update-index", "-z", "--add", "--remove", "--replace", "--stdin"}, others);
 }
 
 void ChangeModel::unstage(const Names &paths) const

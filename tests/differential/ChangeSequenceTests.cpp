@@ -21,6 +21,7 @@ using vclink::test::ChangeSequence;
 
 constexpr std::uint64_t sequenceBlocks = 4;
 constexpr std::uint64_t sequencesInBlock = 13;
+constexpr std::uint64_t variedSequences = 25;
 
 std::uint64_t numberFrom(const char *variable, std::uint64_t otherwise)
 {
@@ -98,6 +99,11 @@ TEST_P(ChangeSequences, LeaveWhatGitLeaves)
     for (const auto &[change, count] : counts())
     {
         std::cout << "  " << count << " x " << change << '\n';
+    }
+    // The suite's own blocks are known to hold every change, others if they are large enough.
+    if (inBlock != sequencesInBlock && inBlock < variedSequences)
+    {
+        return;
     }
     for (const auto *change :
          {"add", "add: AlreadyAdded", "commit", "commit of a merge", "markResolved", "merge",
