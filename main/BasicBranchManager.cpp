@@ -12,6 +12,7 @@
 
 #include "error/errorUtil/GitResult.hpp"
 #include "error/errorUtil/gitString.hpp"
+#include "error/errorUtil/raiseGitError.hpp"
 #include "error/logging/ScopeTrace.hpp"
 #include "error/logging/logger.hpp"
 #include "main/checkout/CheckoutWatch.hpp"
@@ -50,6 +51,28 @@ std::vector<BranchPointer> listBranches(git_branch_t type, git_repository *repos
 OwnedHandle<git_reference> lookupLocalBranch(git_repository *repository, const char *name)
 {
     return acquire<git_reference>(git_branch_lookup, repository, name, GIT_BRANCH_LOCAL).value();
+}
+
+/// Of a function that answers with 1 or 0.
+bool isYes(const GitResult<void> &answer)
+{
+    if (answer.has_value() || answer.error().getCode() < 0)
+    {
+        check(answer);
+        return false;
+    }
+    return true;
+}
+
+/// As git_repository_set_head does, which comes after the files have been written.
+void refuseCheckedOutElsewhere(const git_reference *branch)
+{
+    if (isYes(call(git_branch_is_checked_out, branch)) && !isYes(call(git_branch_is_head, branch)))
+    {
+        raiseGitError(GIT_ERROR, GIT_ERROR_REPOSITORY,
+                      "cannot set HEAD to reference '" + std::string(git_reference_name(branch)) +
+                          "' as it is the current HEAD of a linked repository.");
+    }
 }
 
 } // namespace
@@ -104,6 +127,7 @@ void BasicBranchManager::switchBranch(const BranchName &name)
     IndexLock lock(repository.get());
     const OwnedHandle<git_reference> branch = lookupLocalBranch(repository.get(), shortName);
     const OwnedHandle<git_object> target = revparseObject(repository.get(), name).value();
+    refuseCheckedOutElsewhere(branch.get());
     const CheckoutOptions options = optionsFactory_->makeCheckoutOptions();
     git_checkout_options record = toGitCheckoutOptions(options, callbacks_->checkoutCallbacks());
     CheckoutWatch watch(CheckoutKind::Switch, repository.get(), record);

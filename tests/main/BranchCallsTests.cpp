@@ -70,15 +70,16 @@ TEST_F(CallsOnBranches, OfASwitchAreTheseInOrder)
     makeAhead();
     LibGit2Recorder calls;
     branches().switchBranch("topic");
-    EXPECT_EQ(calls.steps(),
-              joined({{"git_repository_open_ext", "git_index_open", "git_repository_set_index",
-                       "git_index_set_caps", "git_index_free", "git_branch_lookup",
-                       "git_revparse_single", "git_checkout_options_init"},
-                      lookBeforeASwitch_,
-                      {"git_transaction_new", "git_transaction_lock_ref", "git_transaction_free",
-                       "git_checkout_tree", "git_repository_set_head"},
-                      endOfTheLook_,
-                      {"git_object_free", "git_reference_free", "git_repository_free"}}));
+    EXPECT_EQ(
+        calls.steps(),
+        joined({{"git_repository_open_ext", "git_index_open", "git_repository_set_index",
+                 "git_index_set_caps", "git_index_free", "git_branch_lookup", "git_revparse_single",
+                 "git_branch_is_checked_out", "git_checkout_options_init"},
+                lookBeforeASwitch_,
+                {"git_transaction_new", "git_transaction_lock_ref", "git_transaction_free",
+                 "git_checkout_tree", "git_repository_set_head"},
+                endOfTheLook_,
+                {"git_object_free", "git_reference_free", "git_repository_free"}}));
 }
 
 TEST_F(CallsOnBranches, OfASwitchHaveTheRecordOfASafeCheckout)

@@ -206,6 +206,27 @@ TEST_F(SwitchBranch, FailsWhereTheRepositoryCannotBeOpened)
     EXPECT_EQ(libGit2FailureOf([this] { switchTo("topic"); }).code, GIT_ENOTFOUND);
 }
 
+/// libgit2 finds that out when the files are written.
+TEST_F(SwitchBranch, IsRefusedIfAnotherWorkingCopyHasTheBranch)
+{
+    repository_.git({"worktree", "add", "--quiet", "../other copy", "topic"});
+    const vclink::test::LibGit2Failure failure{
+        GIT_ERROR, GIT_ERROR_REPOSITORY,
+        "cannot set HEAD to reference 'refs/heads/topic' as it is the "
+        "current HEAD of a linked repository."};
+    expectRefused("topic", failure);
+    repository_.git({"checkout", "--quiet", "--detach"});
+    {
+        const NothingChanges nothing(repository_);
+        EXPECT_EQ(libGit2FailureOf([this] { switchTo("topic"); }), failure);
+    }
+    switchTo("main");
+    switchTo("main");
+    repository_.git({"worktree", "remove", "../other copy"});
+    switchTo("topic");
+    EXPECT_EQ(currentBranch(), "refs/heads/topic");
+}
+
 TEST_F(SwitchBranch, IsRefusedWhileTheIndexIsLocked)
 {
     repository_.write(".git/index.lock", "");
