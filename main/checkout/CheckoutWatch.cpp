@@ -11,6 +11,7 @@
 #include "error/errorUtil/GitResult.hpp"
 #include "error/errorUtil/callbackException.hpp"
 #include "error/errorUtil/libgit2Errors.hpp"
+#include "main/checkout/conflictLocks.hpp"
 #include "main/checkout/gitlinks.hpp"
 #include "main/checkout/obstaclesAhead.hpp"
 #include "util/repository/repository.hpp"
@@ -116,12 +117,15 @@ CheckoutWatch::CheckoutWatch(CheckoutKind kind, git_repository *repository,
                              git_checkout_options &record)
     : kind_(kind), repository_(repository), record_(record),
       isForced_((record.checkout_strategy & GIT_CHECKOUT_FORCE) != 0), first_(record.notify_cb),
-      firstPayload_(record.notify_payload)
+      firstPayload_(record.notify_payload), progress_(record.progress_cb),
+      progressPayload_(record.progress_payload)
 {
     const char *const workdir = git_repository_workdir(repository);
     root_ = workdir != nullptr ? workdir : "";
     record.notify_cb = pass;
     record.notify_payload = this;
+    record.progress_cb = passProgress;
+    record.progress_payload = this;
     // A link or a FIFO that comes later must not be written through, or wait for a reader, either.
     record.file_open_flags = O_CREAT | O_TRUNC | O_WRONLY | O_NOFOLLOW | O_NONBLOCK;
 }
@@ -188,6 +192,10 @@ void CheckoutWatch::lookBeforeMerge(const git_oid *theirs)
                          [&](const TreeChange &change)
                          {
                              found = ask(mergeRules, copy, change);
+                             if (!found)
+                             {
+                                 found = findLockOfConflict(repository_, copy, change, after.get());
+                             }
                              merged_.noteChange(copy, change);
                              yielding = firstOf(yielding, findYielding(copy, change));
                              mayBeRenamed = mayBeRenamed || isDeletedByBoth(copy, change);
@@ -245,6 +253,30 @@ int CheckoutWatch::pass(git_checkout_notify_t why, const char *path, const git_d
     }
 }
 
+/// After the last notification, and before libgit2 writes.
+void CheckoutWatch::passProgress(const char *path, std::size_t completed, std::size_t total,
+                                 void *payload) noexcept
+{
+    auto &watch = *static_cast<CheckoutWatch *>(payload);
+    watch.hardLinks_.part();
+    if (watch.progress_ != nullptr)
+    {
+        watch.progress_(path, completed, total, watch.progressPayload_);
+    }
+}
+
+Finding CheckoutWatch::noteHardLink(const CheckoutNotice &notice)
+{
+    const bool makesFile = notice.why == GIT_CHECKOUT_NOTIFY_UPDATED && notice.target != nullptr &&
+                           !isGitlink(notice.target);
+    if (!makesFile || hardLinks_.note(root_ + notice.path))
+    {
+        return {};
+    }
+    return Obstacle{notice.path, "the file '" + std::string(notice.path) +
+                                     "' has further names, and its folder cannot be written to"};
+}
+
 int CheckoutWatch::hear(const CheckoutNotice &notice)
 {
     if (notice.path == nullptr)
@@ -253,7 +285,8 @@ int CheckoutWatch::hear(const CheckoutNotice &notice)
     }
     if (kind_ == CheckoutKind::Revert)
     {
-        return codeFor(clearAll(notice));
+        const Finding found = clearAll(notice);
+        return codeFor(found ? found : noteHardLink(notice));
     }
     if (!copy_)
     {
@@ -269,7 +302,8 @@ int CheckoutWatch::hear(const CheckoutNotice &notice)
             return GIT_EMODIFIED;
         }
     }
-    return codeFor(judge(notice));
+    const Finding found = judge(notice);
+    return codeFor(found ? found : noteHardLink(notice));
 }
 
 Finding CheckoutWatch::judge(const CheckoutNotice &notice)

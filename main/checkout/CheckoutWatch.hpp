@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include <cstddef>
 #include <optional>
 #include <string>
 
@@ -9,6 +10,7 @@
 
 #include "error/errorUtil/OwnedHandle.hpp"
 #include "main/checkout/ClearedWay.hpp"
+#include "main/checkout/HardLinks.hpp"
 #include "main/checkout/MergeSubmodules.hpp"
 #include "main/checkout/Obstacle.hpp"
 #include "main/checkout/SwitchSubmodules.hpp"
@@ -41,13 +43,14 @@ enum class CheckoutKind
 /// the new commit are not deleted.
 ///
 /// The record's own notification is asked first, so that a cancellation comes before a refusal; it
-/// is told of what is refused as of any other conflict.
+/// is told of what is refused as of any other conflict. The record's progress tells when libgit2
+/// begins to write, and is handed on.
 class CheckoutWatch
 {
   public:
     /// @param repository outlives the watch
-    /// @param record outlives the watch; its notification is taken over, and its baseline set by
-    /// the look before
+    /// @param record outlives the watch; its notification and its progress are taken over, and its
+    /// baseline set by the look before
     [[nodiscard]] CheckoutWatch(CheckoutKind kind, git_repository *repository,
                                 git_checkout_options &record);
     CheckoutWatch(const CheckoutWatch &) = delete;
@@ -71,7 +74,10 @@ class CheckoutWatch
     static int pass(git_checkout_notify_t why, const char *path, const git_diff_file *baseline,
                     const git_diff_file *target, const git_diff_file *workdir,
                     void *payload) noexcept;
+    static void passProgress(const char *path, std::size_t completed, std::size_t total,
+                             void *payload) noexcept;
     int hear(const CheckoutNotice &notice);
+    Finding noteHardLink(const CheckoutNotice &notice);
     Finding judge(const CheckoutNotice &notice);
     void makeWay(const CheckoutNotice &notice);
     WorkingCopy &lookAtWorkingCopy();
@@ -85,6 +91,8 @@ class CheckoutWatch
     bool isForced_;
     git_checkout_notify_cb first_;
     void *firstPayload_;
+    git_checkout_progress_cb progress_;
+    void *progressPayload_;
     std::string root_;
     /// Empty until the look before; a revert needs none.
     std::optional<WorkingCopy> copy_;
@@ -96,6 +104,7 @@ class CheckoutWatch
     /// What libgit2 itself replaces, as the last notification with something there has told.
     std::string replaced_;
     ClearedWay cleared_;
+    HardLinks hardLinks_;
 };
 
 } // namespace vclink::git

@@ -7,7 +7,6 @@
 #include <sys/stat.h>
 
 #include "main/checkout/gitlinks.hpp"
-#include "util/repository/objectIds.hpp"
 
 namespace vclink::git
 {
@@ -30,12 +29,6 @@ bool isWrittenUnnoticed(WorkingCopy &copy, const TreeChange &change)
 Obstacle stagedChangesOf(const std::string &name)
 {
     return {name, "the staged changes of '" + name + "' would be lost in the checkout"};
-}
-
-bool isOf(const git_index_entry &entry, const git_tree_entry *side)
-{
-    return side != nullptr && isSameId(entry.id, *git_tree_entry_id(side)) &&
-           entry.mode == static_cast<unsigned>(git_tree_entry_filemode(side));
 }
 
 } // namespace

@@ -4,7 +4,11 @@
 #include <functional>
 #include <string>
 
+#include <git2/index.h>
+#include <git2/tree.h>
 #include <git2/types.h>
+
+#include "util/repository/objectIds.hpp"
 
 namespace vclink::git
 {
@@ -19,6 +23,13 @@ struct TreeChange
     const git_tree_entry *before;
     const git_tree_entry *after;
 };
+
+/// Whether the index has what one side has.
+inline bool isOf(const git_index_entry &entry, const git_tree_entry *side)
+{
+    return side != nullptr && isSameId(entry.id, *git_tree_entry_id(side)) &&
+           entry.mode == static_cast<unsigned>(git_tree_entry_filemode(side));
+}
 
 /// Visits what differs, in path order, until `visit` returns false. git_diff_tree_to_tree gives the
 /// same for several times the cost. Folders that are equal are not read.

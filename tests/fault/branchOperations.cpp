@@ -130,6 +130,7 @@ std::vector<Operation> branchOperations()
         {"mergeThreeWay", makeDiverged, doing(merge), badState, abort},
         {"mergeBesideHidden", makeHidden, doing(merge), badState, abortHidden},
         {"mergeOverIgnored", makeIgnored, doing(merge), badState, abort},
+        {"mergeBesideLock", makeMergedBesideLock, doing(merge), badState, abort},
         {"mergeSubmodules", makeDivergedSubmodules, doing(merge), badState, abort},
         {"mergeConflict", makeConflict, doing(merge), badState, abort},
         {"mergeUnmergeable", makeUnmergeableConflict, doing(merge), badState, abort},

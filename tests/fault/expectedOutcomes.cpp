@@ -153,6 +153,10 @@ std::vector<Tolerance> tolerancesOfOthers(const std::string &operation, const st
         {"merge", "git_index_conflict_next", any, GIT_ITEROVER, normal},
         // A name that HEAD does not have, and histories without a common commit.
         {"", "git_tree_entry_bypath", any, GIT_ENOTFOUND, normal},
+        {"mergeBesideLock", "git_merge_bases", any, GIT_ENOTFOUND,
+         failureIn(operation, GIT_ECONFLICT, GIT_ERROR_CHECKOUT,
+                   "the conflict in 'file' cannot be written beside 'file.lock': merge with 'git "
+                   "merge'")},
         {"merge", "git_merge_bases", any, GIT_ENOTFOUND, normal},
         // A state without a name.
         {"getRepositoryState", "git_repository_state", any, any, "done: "},
@@ -166,6 +170,7 @@ std::vector<Tolerance> tolerancesOfOthers(const std::string &operation, const st
         {"mergeThreeWay", "git_diff_tree_to_tree", any, any, normal, true},
         {"mergeBesideHidden", "git_diff_tree_to_tree", any, any, normal, true},
         {"mergeOverIgnored", "git_diff_tree_to_tree", any, any, normal, true},
+        {"mergeBesideLock", "git_diff_tree_to_tree", any, any, normal, true},
         {"mergeSubmodules", "git_diff_tree_to_tree", any, any, normal, true},
         {"merge", "git_index_has_conflicts", any, any, hasConflicts},
         // The first look-up chooses the words of the message, the second is the commit's, after

@@ -211,6 +211,18 @@ void makeConflict(GitRepository &repository)
     divergeInFile(repository);
 }
 
+void makeMergedBesideLock(GitRepository &repository)
+{
+    makePlain(repository);
+    repository.git({"checkout", "--quiet", "-b", "topic"});
+    repository.write("file", "1\n2\ntheirs\n");
+    repository.write("file.lock", "theirs\n");
+    repository.commitAll("on topic");
+    repository.git({"checkout", "--quiet", "main"});
+    repository.write("file", "ours\n2\n3\n");
+    repository.commitAll("on main");
+}
+
 void makeUnmergeableConflict(GitRepository &repository)
 {
     makeConflictUnder(repository, "file -merge\n");

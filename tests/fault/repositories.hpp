@@ -49,9 +49,11 @@ void makeMergingSubmodule(GitRepository &repository);
 void makeMerging(GitRepository &repository);
 /// Main and topic change the same line of "file", for which there is no tool.
 void makeConflict(GitRepository &repository);
-/// The same, "file" being one that must not hold markers.
+/// Main and topic change other lines of "file", and "topic" adds "file.lock".
+void makeMergedBesideLock(GitRepository &repository);
+/// Conflict, "file" being one that must not hold markers.
 void makeUnmergeableConflict(GitRepository &repository);
-/// The same, a configured command merging the file.
+/// Conflict, a configured command merging the file.
 void makeConflictForTool(GitRepository &repository);
 /// Conflict, and stopped in its merge.
 void makeConflicted(GitRepository &repository);

@@ -47,7 +47,6 @@ class BranchCallsTest : public MergeTest
         EXPECT_NE(record.progress_cb, nullptr);
         EXPECT_NE(record.perfdata_cb, nullptr);
         const void *const callbacks = &adapter_->getCallbacks().checkoutCallbacks();
-        EXPECT_EQ(record.progress_payload, callbacks);
         EXPECT_EQ(record.perfdata_payload, callbacks);
         EXPECT_NE(record.baseline, nullptr) << "the tree that was looked at";
         EXPECT_EQ(record.target_directory, nullptr);

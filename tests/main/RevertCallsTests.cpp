@@ -202,7 +202,6 @@ TEST_F(RevertCalls, CheckOutWithTheAdaptersCallbacks)
     EXPECT_EQ(records_[0].notify_flags, static_cast<unsigned>(GIT_CHECKOUT_NOTIFY_ALL));
     EXPECT_NE(records_[0].progress_cb, nullptr);
     EXPECT_NE(records_[0].perfdata_cb, nullptr);
-    EXPECT_EQ(records_[0].progress_payload, callbacks);
     EXPECT_EQ(records_[0].perfdata_payload, callbacks);
     EXPECT_EQ(records_[0].baseline, nullptr);
     EXPECT_EQ(records_[0].baseline_index, nullptr);

@@ -1,0 +1,118 @@
+// SPDX-License-Identifier: MIT
+#include "main/checkout/conflictLocks.hpp"
+
+#include <memory>
+#include <string>
+
+#include <git2/attr.h>
+#include <git2/errors.h>
+#include <git2/index.h>
+#include <git2/merge.h>
+#include <git2/tree.h>
+
+#include "error/errorUtil/GitResult.hpp"
+#include "main/checkout/gitlinks.hpp"
+
+namespace vclink::git
+{
+namespace
+{
+
+/// Owner of what git_merge_file_from_index gives.
+class MergedFile
+{
+  public:
+    MergedFile() = default;
+    MergedFile(const MergedFile &) = delete;
+    MergedFile &operator=(const MergedFile &) = delete;
+    ~MergedFile()
+    {
+        git_merge_file_result_free(&result_);
+    }
+
+    git_merge_file_result *get() noexcept
+    {
+        return &result_;
+    }
+
+  private:
+    git_merge_file_result result_{};
+};
+
+git_index_entry entryOf(const std::string &path, const git_tree_entry *side)
+{
+    git_index_entry entry{};
+    entry.path = path.c_str();
+    entry.mode = static_cast<unsigned>(git_tree_entry_filemode(side));
+    entry.id = *git_tree_entry_id(side);
+    return entry;
+}
+
+/// What a command does cannot be known before.
+bool hasCommand(git_repository *repository, const std::string &path)
+{
+    const char *value = nullptr;
+    static_cast<void>(git_attr_get(&value, repository, 0, path.c_str(), "merge"));
+    return git_attr_value(value) == GIT_ATTR_VALUE_STRING;
+}
+
+/// Whether the lines cannot be joined.
+bool isConflict(git_repository *repository, const git_index_entry &ours, const TreeChange &change)
+{
+    const git_index_entry theirs = entryOf(change.path, change.after);
+    git_index_entry before{};
+    if (change.before != nullptr)
+    {
+        before = entryOf(change.path, change.before);
+    }
+    MergedFile merged;
+    check(git_merge_file_from_index, merged.get(), repository,
+          change.before != nullptr ? &before : nullptr, &ours, &theirs, nullptr);
+    return merged.get()->automergeable == 0;
+}
+
+bool isInTree(const git_tree *tree, const std::string &path)
+{
+    git_tree_entry *raw = nullptr;
+    const GitResult<void> found = call(git_tree_entry_bypath, &raw, tree, path.c_str());
+    const std::unique_ptr<git_tree_entry, void (*)(git_tree_entry *)> entry(raw,
+                                                                            git_tree_entry_free);
+    if (found.has_error() && found.error().getCode() == GIT_ENOTFOUND)
+    {
+        return false;
+    }
+    check(found);
+    return true;
+}
+
+/// A tracked file that is missing comes back before the conflicts are written.
+bool isThere(WorkingCopy &copy, const std::string &path, const git_tree *theirs)
+{
+    return copy.at(path) != Standing::Nothing || copy.entryOf(path) != nullptr ||
+           isInTree(theirs, path);
+}
+
+} // namespace
+
+Finding findLockOfConflict(git_repository *repository, WorkingCopy &copy, const TreeChange &change,
+                           const git_tree *theirs)
+{
+    const git_index_entry *const ours = copy.entryOf(change.path);
+    const bool areFiles = ours != nullptr && !isGitlink(ours) && change.after != nullptr &&
+                          !isGitlink(change.after) && !isGitlink(change.before);
+    if (!areFiles || isOf(*ours, change.before) || isOf(*ours, change.after))
+    {
+        return {};
+    }
+    const std::string lock = change.path + ".lock";
+    if (!isThere(copy, lock, theirs) ||
+        (!hasCommand(repository, change.path) && !isConflict(repository, *ours, change)))
+    {
+        return {};
+    }
+    return Obstacle{change.path, "the conflict in '" + change.path +
+                                     "' cannot be written beside '" + lock +
+                                     "': merge with 'git merge'"};
+}
+
+} // namespace vclink::git

@@ -1,0 +1,134 @@
+// SPDX-License-Identifier: MIT
+#include "main/checkout/HardLinks.hpp"
+
+#include <filesystem>
+#include <string>
+
+#include <git2/errors.h>
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+#include <sys/stat.h>
+
+#include "ObstacleTest.hpp"
+#include "support/UnprivilegedUser.hpp"
+#include "support/text.hpp"
+
+namespace
+{
+
+namespace fs = std::filesystem;
+using testing::IsEmpty;
+using vclink::test::asPath;
+using vclink::test::giveToUnprivilegedUser;
+using vclink::test::runAsUnprivilegedUser;
+
+/// Files of the working copy that have a further name, for example in a copy of it that was made of
+/// hard links.
+class HardLinks : public vclink::test::ObstacleTest
+{
+  protected:
+    HardLinks()
+    {
+        fs::create_directory(outside_);
+    }
+    void linkOutside(const std::string &name) const
+    {
+        fs::create_hard_link(repository_ / name, outside_ / name);
+    }
+    std::string readOutside(const std::string &name) const
+    {
+        return repository_.read("../backup/" + name);
+    }
+
+    const fs::path outside_ = folder() / "backup";
+};
+
+TEST_F(HardLinks, KeepTheirContentInASwitch)
+{
+    makeBranch("topic", writing("file", "theirs\n"));
+    linkOutside("file");
+    const std::string before = readOutside("file");
+    branches().switchBranch("topic");
+    EXPECT_EQ(repository_.read("file"), "theirs\n");
+    EXPECT_EQ(readOutside("file"), before);
+    EXPECT_THAT(status(), IsEmpty());
+}
+
+TEST_F(HardLinks, KeepTheirContentInAFastForward)
+{
+    makeBranch("topic", writing("file", "theirs\n"));
+    linkOutside("file");
+    const std::string before = readOutside("file");
+    merge("topic");
+    EXPECT_EQ(repository_.read("file"), "theirs\n");
+    EXPECT_EQ(readOutside("file"), before);
+}
+
+TEST_F(HardLinks, KeepTheirContentInAMerge)
+{
+    diverge(writing("ours", "x"), writing("file", "theirs\n"));
+    linkOutside("file");
+    const std::string before = readOutside("file");
+    merge("topic");
+    EXPECT_EQ(repository_.read("file"), "theirs\n");
+    EXPECT_EQ(readOutside("file"), before);
+}
+
+/// The merge's commit would take a change that nobody has made.
+TEST_F(HardLinks, WithinTheWorkingCopyKeepTheirContentInAMerge)
+{
+    repository_.write("d/g", "f\n");
+    repository_.commitAll("the same twice");
+    diverge(writing("ours", "x"), writing("d/f", "theirs\n"));
+    repository_.remove("d/g");
+    fs::create_hard_link(repository_ / "d/f", repository_ / "d/g");
+    merge("topic");
+    EXPECT_EQ(repository_.read("d/g"), "f\n");
+    EXPECT_EQ(repository_.git({"show", "HEAD:d/g"}), "f\n");
+}
+
+TEST_F(HardLinks, KeepTheirContentInARevert)
+{
+    linkOutside("file");
+    const std::string committed = repository_.read("file");
+    repository_.write("file", "mine\n");
+    ASSERT_EQ(readOutside("file"), "mine\n");
+    adapter_->revertFiles({asPath((repository_ / "file").string())});
+    EXPECT_EQ(repository_.read("file"), committed);
+    EXPECT_EQ(readOutside("file"), "mine\n");
+}
+
+TEST_F(HardLinks, AreLeftIfTheCheckoutIsRefused)
+{
+    makeBranch("topic",
+               [this]
+               {
+                   repository_.write("file", "theirs\n");
+                   repository_.write("zz", "theirs\n");
+               });
+    linkOutside("file");
+    repository_.write("zz", "mine\n");
+    EXPECT_EQ(vclink::test::libGit2FailureOf([this] { branches().switchBranch("topic"); }).code,
+              GIT_ECONFLICT);
+    EXPECT_TRUE(fs::equivalent(repository_ / "file", outside_ / "file"));
+}
+
+/// libgit2 could write to the file, though not make another.
+TEST_F(HardLinks, InAFolderThatCannotBeWrittenToAreRefused)
+{
+    makeBranch("topic", writing("d/f", "theirs\n"));
+    fs::create_hard_link(repository_ / "d/f", outside_ / "f");
+    giveToUnprivilegedUser(folder().path());
+    repository_.setMode("d", 0555);
+    const std::string text = runAsUnprivilegedUser(
+        [this] {
+            return vclink::test::libGit2FailureOf([this] { branches().switchBranch("topic"); })
+                .text;
+        });
+    repository_.setMode("d", 0755);
+    EXPECT_EQ(text, "the file 'd/f' has further names, and its folder cannot be written to");
+    EXPECT_EQ(readOutside("f"), "f\n");
+    EXPECT_EQ(repository_.read(".git/HEAD"), "ref: refs/heads/main\n");
+}
+
+} // namespace
