@@ -52,6 +52,12 @@ Finding findUnseen(WorkingCopy &copy, const CheckoutNotice &notice)
         return inTheWay(way.blocker, way.standing);
     }
     const Standing standing = copy.at(name);
+    if (standing == Standing::Folder && copy.isFolderInHead(name))
+    {
+        // What HEAD has there goes first.
+        const std::string foreign = copy.foreignBelow(name);
+        return foreign.empty() ? Finding() : inChangedFolder(foreign, copy.at(foreign));
+    }
     const bool isInTheWay =
         standing == Standing::Special || (!isGitlink(notice.target) && copy.holdsFiles(name));
     return isInTheWay ? inTheWay(name, standing) : Finding();

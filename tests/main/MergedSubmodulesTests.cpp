@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: MIT
 #include <functional>
+#include <memory>
 #include <string>
 
 #include <gmock/gmock.h>
@@ -13,6 +14,7 @@ namespace
 
 using testing::ElementsAre;
 using testing::IsEmpty;
+using vclink::test::asPath;
 using vclink::test::GitRepository;
 
 /// Merges of branches that have the submodule "module", whose repository has three commits.
@@ -360,6 +362,40 @@ TEST_F(MergedSubmodules, DoNotHideWhatIsStagedInTheirFolder)
     repository_.add({"module/staged"});
     EXPECT_THAT(failureOfMerge("topic"), testing::HasSubstr("would be overwritten by merge"));
     EXPECT_THAT(status(), ElementsAre("A  module/staged"));
+}
+
+/// Has other entries in the index by the time of the merge's own commit.
+class LateEntriesAdapter : public vclink::git::GitAdapter
+{
+  public:
+    using GitAdapter::GitAdapter;
+
+    void commit(const upath &folder, const ustring &message) override
+    {
+        addEntries();
+        GitAdapter::commit(folder, message);
+    }
+
+    std::function<void()> addEntries;
+};
+
+/// libgit2 leaves such an entry where it could not write the file.
+TEST_F(MergedSubmodules, ThatNoParentHasAreNotInAMerge)
+{
+    theyMove(writing("ours", "x"));
+    LateEntriesAdapter adapter(
+        asPath(repository_.path()),
+        std::static_pointer_cast<vclink::ApplicationInteractor>(interactor_));
+    adapter.addEntries = [this]
+    {
+        for (const auto *name : {"nowhere", "other"})
+            repository_.git(
+                {"update-index", "--add", "--cacheinfo", "160000," + first_ + ',' + name});
+    };
+    vclink::git::BranchManager::create(adapter)->merge("topic");
+    EXPECT_EQ(repository_.git({"ls-tree", "--name-only", "HEAD", "nowhere"}), "");
+    EXPECT_EQ(repository_.git({"show", "HEAD:other"}), repository_.read("other"));
+    EXPECT_EQ(idOf("HEAD:module"), second_);
 }
 
 } // namespace

@@ -176,6 +176,8 @@ TEST_F(RevertObstacles, FoldersInThePlaceOfAFileAreReplacedAsGitDoes)
 TEST_F(RevertObstacles, FilesInThePlaceOfAFolderAreReplacedAsGitDoes)
 {
     repository_.git({"reset", "--quiet", "--hard"});
+    repository_.write("sub/other", "x");
+    repository_.commitAll("third");
     repository_.remove("sub");
     repository_.write("sub", "mine\n");
     expectRevertsAsGit({"sub"});
@@ -204,6 +206,24 @@ TEST_F(RevertObstacles, ThatLibGit2IsPastAreRefused)
     repository_.remove("file");
     repository_.makeFolder("file");
     expectRevertsAsGit({"sub/inside", "sub-b", "file", "file-b"});
+}
+
+TEST_F(RevertObstacles, FoldersWithFilesThatLibGit2IsPastAreRefused)
+{
+    repository_.git({"reset", "--quiet", "--hard"});
+    repository_.write("file-b", "x");
+    repository_.commitAll("neighbour");
+    repository_.remove("file");
+    repository_.write("file/mine", "mine\n");
+    repository_.write("file-b", "edited\n");
+    const auto before = workingTreeOf(repository_);
+    const std::string text = "the folder 'file' is in the way of the checkout";
+    EXPECT_EQ(failureOf(
+                  [this] {
+                      revert({"file", "file-b"});
+                  }),
+              (Failure{GIT_ECONFLICT, GIT_ERROR_CHECKOUT, text}));
+    EXPECT_EQ(workingTreeOf(repository_), before);
 }
 
 TEST_F(RevertObstacles, AreFilesInThePlaceOfASubmodule)

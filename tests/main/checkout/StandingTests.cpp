@@ -9,6 +9,8 @@
 #include "ObstacleTest.hpp"
 #include "main/checkout/ClearedWay.hpp"
 #include "support/GitTest.hpp"
+#include "support/UnprivilegedUser.hpp"
+#include "support/text.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
 
 namespace
@@ -17,8 +19,10 @@ namespace
 namespace fs = std::filesystem;
 namespace git = vclink::git;
 using git::Standing;
+using vclink::test::giveToUnprivilegedUser;
 using vclink::test::makeFifo;
 using vclink::test::makeSocket;
+using vclink::test::runAsUnprivilegedUser;
 
 class StandingOfPaths : public vclink::test::GitTest
 {
@@ -76,6 +80,16 @@ TEST_F(StandingOfPaths, OfFoldersIsWhetherTheyHoldFiles)
     EXPECT_TRUE(holdsFiles("folder"));
 }
 
+TEST_F(StandingOfPaths, OfFoldersThatCannotBeReadIsThatTheyHoldFiles)
+{
+    fs::permissions(*this / "folder/inner", fs::perms::none);
+    giveToUnprivilegedUser(folder().path());
+    const auto answer = [this] { return holdsFiles("folder") ? "files" : "none"; };
+    EXPECT_EQ(runAsUnprivilegedUser(answer), "files");
+    fs::permissions(*this / "folder/inner", fs::perms::owner_all);
+    EXPECT_EQ(runAsUnprivilegedUser(answer), "none");
+}
+
 TEST_F(StandingOfPaths, OfLinksIsWhatTheyLeadTo)
 {
     EXPECT_EQ(git::readLink((*this / "dangling").string()), "nowhere");
@@ -129,6 +143,39 @@ TEST_F(ClearedWay, NeverRemovesFilesAndFoldersWithContent)
     way.remove((*this / "nothing").string());
     EXPECT_EQ(at("file"), Standing::File);
     EXPECT_EQ(at("folder"), Standing::Folder);
+}
+
+TEST_F(ClearedWay, DoesNotMakeAFolderThatItHasNotRemoved)
+{
+    {
+        git::ClearedWay way;
+        way.remove((*this / "folder").string());
+        fs::remove_all(*this / "folder");
+    }
+    EXPECT_EQ(at("folder"), Standing::Nothing);
+}
+
+TEST_F(ClearedWay, FailsAtWhatItCannotRemove)
+{
+    fs::permissions(*this / "", fs::perms::owner_read | fs::perms::owner_exec);
+    giveToUnprivilegedUser(folder().path());
+    const std::string outcome = runAsUnprivilegedUser(
+        [this]
+        {
+            git::ClearedWay way;
+            try
+            {
+                way.remove((*this / "link").string());
+            }
+            catch (const git::LibGit2Exception &exception)
+            {
+                return vclink::test::asUtf8(exception.getError().getMessage());
+            }
+            return std::string("removed");
+        });
+    fs::permissions(*this / "", fs::perms::owner_all);
+    EXPECT_EQ(outcome, "could not remove '" + (*this / "link").string() + "': Permission denied");
+    EXPECT_EQ(at("link"), Standing::Link);
 }
 
 } // namespace

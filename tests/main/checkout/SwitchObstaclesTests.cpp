@@ -311,6 +311,21 @@ TEST_F(SwitchObstacles, ComeAfterACancellation)
     expectRefused(inTheWay("untracked file 'n'"));
 }
 
+/// A host's options factory may ask for force, which is what staged changes give way to.
+TEST_F(SwitchObstacles, OfAForcedSwitchAreNotStagedChanges)
+{
+    makeTopic(writing("d/f", "theirs\n"));
+    repository_.write("d/f", "staged\n");
+    repository_.add({"d/f"});
+    repository_.write("d/f", "mine\n");
+    const auto factory = std::make_shared<vclink::test::TestOptionsFactory>(interactor_);
+    factory->checkoutOptions.checkoutStrategy = GIT_CHECKOUT_FORCE;
+    git::GitAdapter adapter(vclink::test::asPath(repository_.path()), factory);
+    git::BranchManager::create(adapter)->switchBranch("topic");
+    EXPECT_EQ(repository_.read("d/f"), "theirs\n");
+    EXPECT_THAT(status(), IsEmpty());
+}
+
 /// Whatever the host's factory gives.
 TEST_F(SwitchObstacles, OfAFastForwardDoNotDependOnTheFactory)
 {

@@ -1,0 +1,111 @@
+// SPDX-License-Identifier: MIT
+// What a merge meets that libgit2 does not tell of, for its walk is past it, or that it takes for
+// something of its own.
+#include <filesystem>
+#include <string>
+#include <vector>
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include "ObstacleTest.hpp"
+
+namespace
+{
+
+namespace fs = std::filesystem;
+using testing::IsEmpty;
+using vclink::test::makeFifo;
+
+class PassedObstacles : public vclink::test::ObstacleTest
+{
+  protected:
+    /// Diverges; theirs is "topic". "n-b" sorts between "n" and "n/".
+    void theyWrite(const std::vector<std::string> &names)
+    {
+        repository_.write("n-b", "x");
+        repository_.commitAll("neighbour");
+        diverge(writing("ours", "x"),
+                [&]
+                {
+                    for (const auto &name : names)
+                        repository_.write(name, "theirs\n");
+                });
+    }
+    void ignore(const std::string &pattern)
+    {
+        repository_.write(".git/info/exclude", pattern + '\n');
+    }
+};
+
+TEST_F(PassedObstacles, AreNotIgnoredLinksWhichAreReplacedAsGitDoes)
+{
+    theyWrite({"n-b", "n/new"});
+    ignore("n");
+    repository_.symlink("../outside", "n");
+    expectCleanAsGit();
+    expectNothingOutsideChanged();
+}
+
+TEST_F(PassedObstacles, AreFoldersWithIgnoredFilesWhereAFileComes)
+{
+    theyWrite({"n", "n-b"});
+    ignore("mine");
+    repository_.write("n/mine", "mine\n");
+    expectMergeRefused(inTheWay("folder 'n'"));
+    repository_.remove("n");
+    expectCleanAsGit();
+}
+
+TEST_F(PassedObstacles, AreIgnoredFoldersWhereAFileComes)
+{
+    theyWrite({"n", "n-b"});
+    ignore("n");
+    repository_.write("n/mine", "mine\n");
+    expectMergeRefused(inTheWay("folder 'n'"));
+}
+
+TEST_F(PassedObstacles, AreNotTrackedFoldersThatBecomeAFile)
+{
+    repository_.write("d-b", "x");
+    repository_.commitAll("neighbour");
+    const auto change = [this]
+    {
+        repository_.remove("d");
+        repository_.write("d", "theirs\n");
+        repository_.write("d-b", "theirs\n");
+    };
+    makeBranch("ahead", change);
+    diverge(writing("ours", "x"), change);
+    repository_.write("d/mine", "mine\n");
+    expectMergeRefused(inChangedFolder("file 'd/mine'"));
+    repository_.remove("d/mine");
+    expectCleanAsGit();
+    EXPECT_EQ(repository_.read("d"), "theirs\n");
+    repository_.git({"reset", "--quiet", "--hard", "ahead~1"});
+    branches().switchBranch("ahead");
+    EXPECT_EQ(repository_.read("d"), "theirs\n");
+    EXPECT_THAT(status(), IsEmpty());
+}
+
+/// A conflict is written there, and libgit2 tells of none.
+TEST_F(PassedObstacles, AreIgnoredFifosWhereWeDeletedAFileThatTheyChanged)
+{
+    diverge([this] { repository_.remove("d/f"); }, writing("d/f", "theirs\n"));
+    ignore("f");
+    makeFifo(repository_ / "d/f");
+    expectMergeRefused(inTheWay("FIFO, socket or device 'd/f'"));
+    EXPECT_TRUE(fs::is_fifo(repository_ / "d/f"));
+}
+
+TEST_F(PassedObstacles, AreNotStagedFilesThatAreWhatTheyHave)
+{
+    diverge(writing("ours", "x"), writing("d/new", "theirs\n"));
+    repository_.write("d/new", "theirs\n");
+    repository_.add({"d/new"});
+    merge("topic");
+    EXPECT_THAT(parents(), testing::SizeIs(2));
+    EXPECT_THAT(status(), IsEmpty());
+}
+
+} // namespace
