@@ -329,24 +329,26 @@ void CheckoutWatch::noteUntracked(const CheckoutNotice &notice)
     }
 }
 
-/// Removes what no rule keeps and libgit2 would go through or fail at, where a new file comes: an
-/// ignored link, and an empty folder that libgit2 is past.
+/// Removes what no rule keeps and libgit2 would go through or fail at: where a new file comes, an
+/// ignored link; where any file comes, an empty folder that libgit2 is past.
 void CheckoutWatch::makeWay(const CheckoutNotice &notice)
 {
-    if (notice.why != GIT_CHECKOUT_NOTIFY_UPDATED || notice.baseline != nullptr ||
-        notice.target == nullptr || isGitlink(notice.target))
+    const bool isNew = notice.baseline == nullptr;
+    const bool isPast = notice.workdir == nullptr;
+    if (notice.why != GIT_CHECKOUT_NOTIFY_UPDATED || notice.target == nullptr ||
+        isGitlink(notice.target) || !(isNew || isPast))
     {
         return;
     }
     const std::string name = notice.path;
     const WorkingCopy::Way &way = copy_->wayTo(name);
-    if (way.standing == Standing::Link)
+    if (isNew && way.standing == Standing::Link)
     {
         cleared_.remove(root_ + way.blocker);
         copy_->forgetWays();
     }
     const Standing standing = copy_->at(name);
-    if (standing == Standing::Link || (standing == Standing::Folder && notice.workdir == nullptr))
+    if ((isNew && standing == Standing::Link) || (isPast && standing == Standing::Folder))
     {
         cleared_.remove(root_ + name);
     }

@@ -53,6 +53,12 @@ const std::vector<Obstacle> &allObstacles();
 /// change of a file that no other branch touches.
 void makeSurroundings(const std::filesystem::path &folder);
 
+/// The same, with a sibling beside most places' path, which each branch but "ours" changes.
+void makeSurroundingsWithSiblings(const std::filesystem::path &folder);
+
+/// The name beside a path that libgit2 sorts between a file of that path and a folder of it.
+std::string siblingOf(const std::string &path);
+
 /// The same of submodules, and two more.
 const std::vector<Place> &submodulePlaces();
 const std::vector<Obstacle> &submoduleObstacles();
@@ -68,6 +74,7 @@ const std::vector<Place> &replacedSubmodulePlaces();
 /// Each of its branches changes the first and the last file as well, but those that begin with
 /// "ours".
 void makeSubmoduleSurroundings(const std::filesystem::path &folder);
+void makeSubmoduleSurroundingsWithSiblings(const std::filesystem::path &folder);
 
 /// Copies what makeSurroundings() has made.
 void copySurroundings(const std::filesystem::path &from, const std::filesystem::path &to);

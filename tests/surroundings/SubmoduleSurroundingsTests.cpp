@@ -36,11 +36,12 @@ struct SubmoduleOperation
     const std::vector<Place> &(*places)() = vclink::test::submodulePlaces;
     /// Completes what a switch to the branch `start` has left.
     void (*begin)(const GitRepository &copy) = [](const GitRepository &) {};
+    bool hasSiblings = false;
 };
 
 std::ostream &operator<<(std::ostream &stream, const SubmoduleOperation &operation)
 {
-    return stream << operation.name;
+    return stream << operation.name << (operation.hasSiblings ? " beside siblings" : "");
 }
 
 void mergeInto(git::BranchManager &branches, const std::string &branch)
@@ -69,6 +70,12 @@ void removeLeftFolders(const GitRepository &copy)
 {
     copy.remove("s");
     copy.remove("t/s");
+}
+
+SubmoduleOperation besideSiblings(SubmoduleOperation operation)
+{
+    operation.hasSiblings = true;
+    return operation;
 }
 
 const std::vector<std::string> mergeByGit{"merge", "--quiet", "--no-edit"};
@@ -119,7 +126,9 @@ const std::vector<SubmoduleOperation> submoduleOperations{
      thereAndBackByGit,
      switchThereAndBack,
      2,
-     {"removes", "renames", "adds"}}};
+     {"removes", "renames", "adds"}},
+    besideSiblings({"merge of submodules", "ours", mergeByGit, mergeInto, 2}),
+    besideSiblings({"switch of submodules", "main", {"switch", "--quiet"}, switchTo, 2})};
 
 /// Of the obstacles that have nothing to do with submodules, those that may matter to them.
 const std::vector<std::string> otherObstacles{"untracked file",
@@ -148,7 +157,9 @@ bool contains(const std::vector<std::string> &names, const std::string &name)
 class SubmoduleSurroundings : public Surroundings
 {
   protected:
-    SubmoduleSurroundings() : Surroundings(vclink::test::makeSubmoduleSurroundings)
+    explicit SubmoduleSurroundings(bool hasSiblings = false)
+        : Surroundings(hasSiblings ? vclink::test::makeSubmoduleSurroundingsWithSiblings
+                                   : vclink::test::makeSubmoduleSurroundings)
     {
         obstacles_ = vclink::test::submoduleObstacles();
         for (Obstacle obstacle : vclink::test::allObstacles())
@@ -163,9 +174,13 @@ class SubmoduleSurroundings : public Surroundings
     std::vector<Obstacle> obstacles_;
 };
 
-class BranchesWithSubmodules : public SubmoduleSurroundings,
-                               public testing::WithParamInterface<SubmoduleOperation>
+class BranchesWithSubmodules : public testing::WithParamInterface<SubmoduleOperation>,
+                               public SubmoduleSurroundings
 {
+  protected:
+    BranchesWithSubmodules() : SubmoduleSurroundings(GetParam().hasSiblings)
+    {
+    }
 };
 
 TEST_P(BranchesWithSubmodules, LoseNothingThatGitKeepsAndOtherwiseDifferByRuleOnly)
@@ -179,7 +194,8 @@ TEST_P(BranchesWithSubmodules, LoseNothingThatGitKeepsAndOtherwiseDifferByRuleOn
         {
             const int commonOnes = int{place.isCommon} + int{obstacle.isCommon};
             const bool isLeftOut =
-                !operation.branches.empty() && !contains(operation.branches, place.branch);
+                (!operation.branches.empty() && !contains(operation.branches, place.branch)) ||
+                (operation.hasSiblings && !hasSibling(place));
             if (obstacle.place != place.holds || commonOnes < operation.commonOnes || isLeftOut)
                 continue;
             auto byGit = operation.byGit;
@@ -194,20 +210,20 @@ TEST_P(BranchesWithSubmodules, LoseNothingThatGitKeepsAndOtherwiseDifferByRuleOn
                                                          place.branch);
                                  });
             };
-            check({{operation.name, obstacle.name, place.name, "", ""},
+            check({{operation.name, obstacle.name, place.name, "", "", operation.hasSiblings},
                    obstacle,
                    place,
                    byGit,
                    byLibrary});
         }
     }
-    conclude(operation.name);
+    conclude(operation.name, operation.hasSiblings);
 }
 
 INSTANTIATE_TEST_SUITE_P(Operations, BranchesWithSubmodules, testing::ValuesIn(submoduleOperations),
                          [](const auto &instance)
                          {
-                             std::string name = instance.param.name;
+                             std::string name = testing::PrintToString(instance.param);
                              std::replace_if(
                                  name.begin(), name.end(),
                                  [](char character)

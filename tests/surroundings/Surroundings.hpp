@@ -48,7 +48,9 @@ class Surroundings : public GitTest
 
     void check(const Cell &cell);
     /// Says what the situations came to, and expects that each difference has been met.
-    void conclude(const std::string &operation) const;
+    void conclude(const std::string &operation, bool hasSiblings = false) const;
+    /// Whether there is something else to look at beside siblings.
+    bool hasSibling(const Place &place) const;
 
     static std::string outcomeOf(const Obstacle &obstacle, const std::function<void()> &action);
     static std::unique_ptr<CMAdapter> makeAdapter(const std::filesystem::path &copy);
@@ -62,6 +64,8 @@ class Surroundings : public GitTest
                                    const std::filesystem::path &folder) const;
     void expectWorksWithoutObstacle(const Cell &cell, const std::filesystem::path &library);
     bool isExplained(const Comparand &comparand);
+    /// Whether it may be the siblings that are in the way, and not the obstacle.
+    static bool isForSiblings(const Comparand &comparand);
 
     LibGit2Session session_{environment()};
     const std::filesystem::path original_ = folder() / "original";

@@ -30,11 +30,12 @@ struct Operation
     void (*byLibrary)(git::BranchManager &branches, const std::string &branch);
     /// of place and obstacle, how many have to be common
     int commonOnes;
+    bool hasSiblings = false;
 };
 
 std::ostream &operator<<(std::ostream &stream, const Operation &operation)
 {
-    return stream << operation.name;
+    return stream << operation.name << (operation.hasSiblings ? "BesideSiblings" : "");
 }
 
 void mergeBranch(git::BranchManager &branches, const std::string &branch)
@@ -50,18 +51,26 @@ void switchBranch(git::BranchManager &branches, const std::string &branch)
 const std::vector<Operation> operations{
     {"merge", "ours", {"merge", "--quiet", "--no-edit"}, mergeBranch, 0},
     {"fastForward", "main", {"merge", "--quiet", "--ff-only"}, mergeBranch, 2},
-    {"switch", "main", {"switch", "--quiet"}, switchBranch, 1}};
+    {"switch", "main", {"switch", "--quiet"}, switchBranch, 1},
+    {"merge", "ours", {"merge", "--quiet", "--no-edit"}, mergeBranch, 1, true},
+    {"switch", "main", {"switch", "--quiet"}, switchBranch, 2, true}};
 
 class FileSurroundings : public Surroundings
 {
   protected:
-    FileSurroundings() : Surroundings(vclink::test::makeSurroundings)
+    explicit FileSurroundings(bool hasSiblings)
+        : Surroundings(hasSiblings ? vclink::test::makeSurroundingsWithSiblings
+                                   : vclink::test::makeSurroundings)
     {
     }
 };
 
-class BranchSurroundings : public FileSurroundings, public testing::WithParamInterface<Operation>
+class BranchSurroundings : public testing::WithParamInterface<Operation>, public FileSurroundings
 {
+  protected:
+    BranchSurroundings() : FileSurroundings(GetParam().hasSiblings)
+    {
+    }
 };
 
 TEST_P(BranchSurroundings, LoseNothingThatGitKeepsAndOtherwiseDifferByRuleOnly)
@@ -73,7 +82,8 @@ TEST_P(BranchSurroundings, LoseNothingThatGitKeepsAndOtherwiseDifferByRuleOnly)
         for (const auto &obstacle : vclink::test::allObstacles())
         {
             const int commonOnes = int{place.isCommon} + int{obstacle.isCommon};
-            if (obstacle.place != place.holds || commonOnes < operation.commonOnes)
+            if (obstacle.place != place.holds || commonOnes < operation.commonOnes ||
+                (operation.hasSiblings && !hasSibling(place)))
                 continue;
             auto byGit = operation.byGit;
             byGit.push_back(place.branch);
@@ -87,22 +97,32 @@ TEST_P(BranchSurroundings, LoseNothingThatGitKeepsAndOtherwiseDifferByRuleOnly)
                                                          place.branch);
                                  });
             };
-            check({{operation.name, obstacle.name, place.name, "", ""},
+            check({{operation.name, obstacle.name, place.name, "", "", operation.hasSiblings},
                    obstacle,
                    place,
                    byGit,
                    byLibrary});
         }
     }
-    conclude(operation.name);
+    conclude(operation.name, operation.hasSiblings);
 }
 
 INSTANTIATE_TEST_SUITE_P(Operations, BranchSurroundings, testing::ValuesIn(operations),
-                         [](const auto &instance) { return instance.param.name; });
+                         testing::PrintToStringParamName());
 
-class RevertSurroundings : public FileSurroundings, public testing::WithParamInterface<bool>
+enum class Listed
+{
+    otherFile,
+    obstacle,
+    obstacleAndSibling
+};
+
+class RevertSurroundings : public testing::WithParamInterface<Listed>, public FileSurroundings
 {
   protected:
+    RevertSurroundings() : FileSurroundings(GetParam() == Listed::obstacleAndSibling)
+    {
+    }
     /// What a revert names in a place: a folder, by a file below it.
     static std::string nameIn(const Place &place)
     {
@@ -112,14 +132,16 @@ class RevertSurroundings : public FileSurroundings, public testing::WithParamInt
 
 TEST_P(RevertSurroundings, LoseNothingThatGitKeepsAndOtherwiseDifferByRuleOnly)
 {
-    const bool isListed = GetParam();
+    const bool isListed = GetParam() != Listed::otherFile;
+    const bool hasSiblings = GetParam() == Listed::obstacleAndSibling;
     const std::string operation = isListed ? "revert" : "revert of another file";
     go("main");
     for (const auto &place : vclink::test::allPlaces())
     {
         for (const auto &obstacle : vclink::test::allObstacles())
         {
-            const bool isWorthwhile = isListed || obstacle.isCommon;
+            const bool isWorthwhile =
+                hasSiblings ? hasSibling(place) : isListed || obstacle.isCommon;
             if (obstacle.place != place.holds || place.branch != "unrelated" || !isWorthwhile)
                 continue;
             std::vector<std::string> byGit{
@@ -133,6 +155,12 @@ TEST_P(RevertSurroundings, LoseNothingThatGitKeepsAndOtherwiseDifferByRuleOnly)
                 if (place.holds != Holds::nothing || obstacle.name.find("staged") == 0)
                     byGit.push_back(nameIn(place));
             }
+            const std::string sibling = vclink::test::siblingOf(place.path);
+            if (hasSiblings)
+            {
+                byGit.push_back(sibling);
+                names.push_back(sibling);
+            }
             const auto byLibrary = [&](const fs::path &copy)
             {
                 return outcomeOf(obstacle,
@@ -144,19 +172,32 @@ TEST_P(RevertSurroundings, LoseNothingThatGitKeepsAndOtherwiseDifferByRuleOnly)
                                      makeAdapter(copy)->revertFiles(paths);
                                  });
             };
-            check({{operation, obstacle.name, place.name, "", ""},
+            check({{operation, obstacle.name, place.name, "", "", hasSiblings},
                    obstacle,
                    place,
                    byGit,
                    byLibrary,
-                   [](const GitRepository &copy) { copy.remove("other"); }});
+                   [&](const GitRepository &copy)
+                   {
+                       copy.remove("other");
+                       if (hasSiblings)
+                           copy.write(sibling, "edited\n");
+                   }});
         }
     }
-    conclude(operation);
+    conclude(operation, hasSiblings);
 }
 
-INSTANTIATE_TEST_SUITE_P(Lists, RevertSurroundings, testing::Bool(),
+INSTANTIATE_TEST_SUITE_P(Lists, RevertSurroundings,
+                         testing::Values(Listed::obstacle, Listed::otherFile,
+                                         Listed::obstacleAndSibling),
                          [](const auto &instance)
-                         { return instance.param ? "OfWhatIsInTheWay" : "OfAnotherFile"; });
+                         {
+                             const bool isListed = instance.param != Listed::otherFile;
+                             const bool hasSiblings = instance.param == Listed::obstacleAndSibling;
+                             return hasSiblings ? "OfWhatIsInTheWayAndSiblings"
+                                    : isListed  ? "OfWhatIsInTheWay"
+                                                : "OfAnotherFile";
+                         });
 
 } // namespace

@@ -33,6 +33,40 @@ const std::map<std::string, Files> branches{
      {{"new", "theirs\n"}, {"t/file", "-"}, {"t/keep", "-"}, {"t/s/file", "-"}, {"t", "theirs\n"}}},
     {"ours", {{"mine", "of ours\n"}}}};
 
+/// Siblings, as they are on a branch.
+void addSiblings(Files &files, const std::string &branch)
+{
+    for (const auto *path : {"d", "file", "new", "t", "t/file", "t/new"})
+    {
+        const bool isInFile = branch == "files" && std::string(path).find('/') != std::string::npos;
+        files[siblingOf(path)] = isInFile ? "-" : "sibling on " + branch + '\n';
+    }
+}
+
+void make(const fs::path &folder, bool hasSiblings)
+{
+    const auto copy = GitRepository::init(folder / "copy");
+    copy.write("../outside/file", "outside\n");
+    copy.write("../outside/keep", "outside\n");
+    copy.write("../outside/new", "outside\n");
+    Files main = committed;
+    if (hasSiblings)
+        addSiblings(main, "main");
+    std::string stream = commitOf("main", main);
+    for (auto [branch, files] : branches)
+    {
+        if (branch != "ours")
+        {
+            files["a first"] = "first of " + branch + '\n';
+            files["zz last"] = "last of " + branch + '\n';
+            if (hasSiblings)
+                addSiblings(files, branch);
+        }
+        stream += commitOf(branch, files);
+    }
+    importCommits(copy, stream);
+}
+
 void copyFiles(const fs::path &from, const fs::path &to)
 {
     fs::copy(from, to, fs::copy_options::recursive | fs::copy_options::copy_symlinks);
@@ -74,20 +108,17 @@ const std::vector<Place> &allPlaces()
 
 void makeSurroundings(const fs::path &folder)
 {
-    const auto copy = GitRepository::init(folder / "copy");
-    copy.write("../outside/file", "outside\n");
-    copy.write("../outside/keep", "outside\n");
-    copy.write("../outside/new", "outside\n");
-    std::string stream = commitOf("main", committed);
-    for (auto [branch, files] : branches)
-    {
-        files["a first"] = "first of " + branch + '\n';
-        files["zz last"] = "last of " + branch + '\n';
-        if (branch == "ours")
-            files = branches.at(branch);
-        stream += commitOf(branch, files);
-    }
-    importCommits(copy, stream);
+    make(folder, false);
+}
+
+void makeSurroundingsWithSiblings(const fs::path &folder)
+{
+    make(folder, true);
+}
+
+std::string siblingOf(const std::string &path)
+{
+    return path + "-b";
 }
 
 void copySurroundings(const fs::path &from, const fs::path &to)

@@ -69,6 +69,13 @@ std::map<std::string, Files> filesOfBranches(const Commits &at)
     };
 }
 
+/// Siblings, as they are on a branch.
+void addModuleSiblings(Files &files, const std::string &branch)
+{
+    for (const auto *path : {"d", "file", "new", "r", "s", "t/new", "t/r", "t/s"})
+        files[siblingOf(path)] = "sibling on " + branch + '\n';
+}
+
 /// @return its commits: each follows the one before
 Commits makeSource(const fs::path &folder)
 {
@@ -80,6 +87,29 @@ Commits makeSource(const fs::path &folder)
         commits[name] = source.commitAll(name);
     }
     return commits;
+}
+
+void makeWithSubmodules(const fs::path &folder, bool hasSiblings)
+{
+    const Commits commits = makeSource(folder / "source");
+    const auto copy = GitRepository::init(folder / "copy");
+    Files main = filesOfMain(commits);
+    if (hasSiblings)
+        addModuleSiblings(main, "main");
+    std::string stream = commitOf("main", main);
+    for (auto [branch, files] : filesOfBranches(commits))
+    {
+        if (branch.compare(0, 4, "ours") != 0)
+        {
+            files["a first"] = "first of " + branch + '\n';
+            files["zz last"] = "last of " + branch + '\n';
+            if (hasSiblings)
+                addModuleSiblings(files, branch);
+        }
+        stream += commitOf(branch, files);
+    }
+    importCommits(copy, stream);
+    copy.git({"submodule", "--quiet", "update", "--init"});
 }
 
 void emptyIt(const GitRepository &copy)
@@ -177,20 +207,12 @@ const std::vector<Place> &replacedSubmodulePlaces()
 
 void makeSubmoduleSurroundings(const fs::path &folder)
 {
-    const Commits commits = makeSource(folder / "source");
-    const auto copy = GitRepository::init(folder / "copy");
-    std::string stream = commitOf("main", filesOfMain(commits));
-    for (auto [branch, files] : filesOfBranches(commits))
-    {
-        if (branch.compare(0, 4, "ours") != 0)
-        {
-            files["a first"] = "first of " + branch + '\n';
-            files["zz last"] = "last of " + branch + '\n';
-        }
-        stream += commitOf(branch, files);
-    }
-    importCommits(copy, stream);
-    copy.git({"submodule", "--quiet", "update", "--init"});
+    makeWithSubmodules(folder, false);
+}
+
+void makeSubmoduleSurroundingsWithSiblings(const fs::path &folder)
+{
+    makeWithSubmodules(folder, true);
 }
 
 } // namespace vclink::test

@@ -26,9 +26,14 @@ bool means(const std::string &pattern, const std::string &text)
 
 bool SurroundingDifference::explains(const Comparand &comparand) const
 {
-    return holds(operations, comparand.operation) &&
-           (obstacles.empty() || holds(obstacles, comparand.obstacle)) &&
-           means(place, comparand.place) && git == comparand.git && library == comparand.library;
+    return isAbout(comparand) && (obstacles.empty() || holds(obstacles, comparand.obstacle)) &&
+           git == comparand.git && library == comparand.library;
+}
+
+bool SurroundingDifference::isAbout(const Comparand &comparand) const
+{
+    return holds(operations, comparand.operation) && means(place, comparand.place) &&
+           (comparand.hasSiblings || !isOfSiblings);
 }
 
 // One table. NOLINTNEXTLINE(readability-function-size)
@@ -246,6 +251,49 @@ const std::vector<SurroundingDifference> &surroundingDifferences()
          through,
          refusal,
          "git deletes the file; libgit2 fails at it while it writes"},
+        // The same, beside siblings.
+        {moduleMerge,
+         {},
+         "a re*",
+         through,
+         refusal,
+         "libgit2 would delete the folder, because a sibling is sorted before it",
+         true},
+        {moduleMerge,
+         {},
+         "a submodule that becomes a f*",
+         through,
+         refusal,
+         "libgit2 would delete the folder, because a sibling is sorted before it",
+         true},
+        {merge,
+         {"ignored folder"},
+         "a new file",
+         through,
+         refusal,
+         "libgit2 is past what is in the way, and would fail at it while it writes",
+         true},
+        {merge,
+         {"ignored file"},
+         "a new folder*",
+         through,
+         refusal,
+         "libgit2 is past what is in the way, and would fail at it while it writes",
+         true},
+        {revert,
+         {"folder in its place"},
+         "a file left alone*",
+         through,
+         refusal,
+         "libgit2 is past what is in the way, and would fail at it while it writes",
+         true},
+        {revert,
+         {"file in the folder's place"},
+         "a folder left alone",
+         through,
+         refusal,
+         "libgit2 is past what is in the way, and would fail at it while it writes",
+         true},
         // git refuses, though nothing is lost.
         {{"switch"},
          {"empty folder in its place"},

@@ -17,6 +17,7 @@ struct Comparand
     std::string git;
     /// the same, or "leaves something else" where git does neither refuse
     std::string library;
+    bool hasSiblings = false;
 };
 
 /// Situations in which the library is not as git is, and why.
@@ -30,8 +31,12 @@ struct SurroundingDifference
     std::string git;
     std::string library;
     std::string reason;
+    /// whether this is so only beside siblings; see siblingOf()
+    bool isOfSiblings = false;
 
     bool explains(const Comparand &comparand) const;
+    /// Whether it is of this operation and place.
+    bool isAbout(const Comparand &comparand) const;
 };
 
 const std::vector<SurroundingDifference> &surroundingDifferences();

@@ -61,6 +61,20 @@ TEST_F(ConflictLocks, RefuseTheMergeIfTheyAreTracked)
     expectRefused();
 }
 
+/// A merge puts back what is missing, before it writes the conflicts.
+TEST_F(ConflictLocks, RefuseTheMergeIfTheyAreMissing)
+{
+    diverge(
+        [this]
+        {
+            repository_.write("file", "ours\n");
+            repository_.write("file.lock", "x");
+        },
+        writing("file", "theirs\n"));
+    repository_.remove("file.lock");
+    expectRefused();
+}
+
 TEST_F(ConflictLocks, RefuseTheMergeIfTheyCome)
 {
     makeConflict(writing("file.lock", "x"));

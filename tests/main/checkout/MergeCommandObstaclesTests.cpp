@@ -60,6 +60,9 @@ TEST_F(MergeCommandObstacles, AreNewFilesThatComeMeanwhile)
     repository_.remove("n");
     defineSaving("ln -s .. n");
     expectRefused("the symbolic link 'n' is in the way of the checkout");
+    repository_.remove("n");
+    defineSaving("mkdir n && mkfifo n/new");
+    expectRefused("the FIFO, socket or device 'n/new' is in the way of the checkout");
 }
 
 TEST_F(MergeCommandObstacles, AreEditsThatGitHides)

@@ -65,6 +65,17 @@ TEST_F(PassedObstacles, AreIgnoredFoldersWhereAFileComes)
     expectMergeRefused(inTheWay("folder 'n'"));
 }
 
+TEST_F(PassedObstacles, AreNotEmptyFoldersInThePlaceOfAFileThatComesBack)
+{
+    repository_.write("n", "x");
+    theyWrite({"n-b"});
+    repository_.remove("n");
+    repository_.makeFolder("n");
+    merge("topic");
+    EXPECT_EQ(repository_.read("n"), "x");
+    EXPECT_THAT(status(), IsEmpty());
+}
+
 TEST_F(PassedObstacles, AreNotTrackedFoldersThatBecomeAFile)
 {
     repository_.write("d-b", "x");
@@ -77,6 +88,7 @@ TEST_F(PassedObstacles, AreNotTrackedFoldersThatBecomeAFile)
     };
     makeBranch("ahead", change);
     diverge(writing("ours", "x"), change);
+    ignore("mine");
     repository_.write("d/mine", "mine\n");
     expectMergeRefused(inChangedFolder("file 'd/mine'"));
     repository_.remove("d/mine");
@@ -86,6 +98,23 @@ TEST_F(PassedObstacles, AreNotTrackedFoldersThatBecomeAFile)
     branches().switchBranch("ahead");
     EXPECT_EQ(repository_.read("d"), "theirs\n");
     EXPECT_THAT(status(), IsEmpty());
+}
+
+/// There is no merge base to tell that the submodule comes, and libgit2 would take the link for its
+/// folder.
+TEST_F(PassedObstacles, AreLinksWhereAnUnrelatedHistoryHasASubmodule)
+{
+    const std::string id = idOf("main");
+    repository_.git({"checkout", "--quiet", "--orphan", "topic"});
+    repository_.git({"rm", "-r", "--quiet", "--force", "."});
+    repository_.git({"update-index", "--add", "--cacheinfo", "160000," + id + ",n/module"});
+    repository_.commit("unrelated");
+    repository_.git({"checkout", "--quiet", "--force", "main"});
+    repository_.symlink("../../outside", "n/module");
+    expectMergeRefused(inTheWay("symbolic link 'n/module'"));
+    repository_.remove("n");
+    merge("topic");
+    EXPECT_EQ(idOf("HEAD:n/module"), id);
 }
 
 /// A conflict is written there, and libgit2 tells of none.
