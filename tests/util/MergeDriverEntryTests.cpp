@@ -18,6 +18,7 @@
 
 #include "error/errorUtil/GitResult.hpp"
 #include "error/errorUtil/callbackException.hpp"
+#include "support/Failure.hpp"
 #include "support/GitTest.hpp"
 #include "support/LibGit2Session.hpp"
 #include "support/LogCapture.hpp"
@@ -25,7 +26,6 @@
 #include "support/Scripts.hpp"
 #include "support/libgit2/LibGit2Recorder.hpp"
 #include "util/GitMergeDriverLookup.hpp"
-#include "vclink/git/LibGit2Exception.hpp"
 #include "vclink/git/LibGit2Guard.hpp"
 
 namespace
@@ -119,24 +119,6 @@ class MergeDriverEntry : public vclink::test::GitTest
             return false;
         }
         return false;
-    }
-    /// The code of the LibGit2Exception; 0 when it is none.
-    static int codeOf(const std::exception_ptr &exception)
-    {
-        try
-        {
-            if (exception != nullptr)
-                std::rethrow_exception(exception);
-        }
-        catch (const git::LibGit2Exception &raised)
-        {
-            return raised.getError().getCode();
-        }
-        catch (const std::exception &)
-        {
-            return 0;
-        }
-        return 0;
     }
 
     git_index_entry ancestor_ = {};
@@ -261,37 +243,14 @@ TEST_F(MergeDriverEntry, PassesTheFileOnWhateverKeepsTheKeyFromBeingRead)
     }
 }
 
-TEST_F(MergeDriverEntry, StoresTheFailureOfTheSnapshot)
-{
-    defineScript("exit 0");
-    calls_.fail({{"git_repository_config_snapshot", GIT_ELOCKED}});
-    const Answer answer = apply();
-    EXPECT_EQ(answer.code, GIT_EUSER);
-    EXPECT_EQ(codeOf(answer.exception), GIT_ELOCKED);
-    EXPECT_EQ(steps_.back(), "git_repository_config_snapshot");
-}
-
-TEST_F(MergeDriverEntry, StoresTheFailureOfAnySideAndRemovesTheFilesBefore)
-{
-    defineScript("exit 0");
-    for (std::size_t failing = 1; failing <= 3; ++failing)
-    {
-        calls_.fail({{"git_odb_read", GIT_EINVALID, failing}});
-        const Answer answer = apply();
-        EXPECT_EQ(answer.code, GIT_EUSER);
-        EXPECT_EQ(codeOf(answer.exception), GIT_EINVALID);
-        EXPECT_THAT(names_, Contains("git_odb_read").Times(failing));
-        EXPECT_FALSE(answer.path);
-    }
-}
-
 TEST_F(MergeDriverEntry, LeavesPathAndModeWhenTheResultCannotBeHandedOver)
 {
     defineScript("exit 0");
     calls_.fail({{"git_buf_set", GIT_ERROR}});
     const Answer answer = apply();
     EXPECT_EQ(answer.code, GIT_EUSER);
-    EXPECT_EQ(codeOf(answer.exception), GIT_ERROR);
+    EXPECT_EQ(vclink::test::failureOf([&] { std::rethrow_exception(answer.exception); }).code,
+              GIT_ERROR);
     EXPECT_FALSE(answer.path);
     EXPECT_FALSE(answer.mode);
     EXPECT_EQ(steps_.back(), "git_config_free");
@@ -374,27 +333,6 @@ TEST_F(MergeDriverEntry, EndsTheProcessWhenTheReportOfAnExceptionFails)
     LogCapture log(0x10);
     log.onRecord([](const LogRecord &) { throw std::domain_error("sink"); });
     EXPECT_EXIT(apply(), testing::KilledBySignal(SIGABRT), "");
-}
-
-TEST(MergeDriverGuard, RegistersBetweenStartAndShutdown)
-{
-    LibGit2Recorder calls;
-    {
-        const git::LibGit2Guard guard;
-        EXPECT_THAT(calls.names(), ElementsAre("git_libgit2_init", "git_merge_driver_register"));
-    }
-    EXPECT_THAT(calls.names(), ElementsAre("git_libgit2_init", "git_merge_driver_register",
-                                           "git_merge_driver_unregister", "git_libgit2_shutdown"));
-}
-
-TEST(MergeDriverGuard, LooksAtNoResult)
-{
-    LibGit2Recorder calls;
-    for (const int code : {GIT_ERROR, GIT_EEXISTS, GIT_ENOTFOUND})
-    {
-        calls.fail({{"git_merge_driver_register", code}, {"git_merge_driver_unregister", code}});
-        EXPECT_NO_THROW(const git::LibGit2Guard guard);
-    }
 }
 
 TEST(MergeDriverGuard, TellsOfTheEndBeforeIt)

@@ -14,16 +14,16 @@
 
 #include "MergeDriverTest.hpp"
 #include "error/errorUtil/callbackException.hpp"
+#include "support/Failure.hpp"
 #include "support/SignalAction.hpp"
 #include "support/text.hpp"
 #include "util/processError.hpp"
-#include "vclink/git/LibGit2Exception.hpp"
 
 namespace
 {
 
 using boost::process::process_error;
-using vclink::git::LibGit2Exception;
+using vclink::test::failureOf;
 using vclink::test::LogCapture;
 using vclink::test::LogRecord;
 using vclink::test::SignalAction;
@@ -105,18 +105,11 @@ TEST_F(MergeDriverFailure, IsOneWhenALinkIsInThePlaceOfTheMergedFile)
     for (const std::string &target : {secret, secret + "-missing"})
     {
         defineScript("tool", "ln -sf '" + target + "' \"$2\"");
-        try
-        {
-            mergeOrThrow();
-            ADD_FAILURE() << "merged through the link to " << target;
-        }
-        catch (const LibGit2Exception &exception)
-        {
-            EXPECT_EQ(exception.getError().getCode(), GIT_ERROR);
-            EXPECT_EQ(exception.getError().getErrorClass(), GIT_ERROR_MERGE);
-            EXPECT_THAT(vclink::test::asUtf8(exception.getError().getMessage()),
-                        testing::StartsWith("a symbolic link is in the place of the merged file"));
-        }
+        const auto failure = failureOf([this] { mergeOrThrow(); });
+        EXPECT_EQ(failure.code, GIT_ERROR) << target;
+        EXPECT_EQ(failure.errorClass, GIT_ERROR_MERGE);
+        EXPECT_THAT(failure.text,
+                    testing::StartsWith("a symbolic link is in the place of the merged file"));
         EXPECT_EQ(repository_.read("file"), "ours\n");
         EXPECT_EQ(staged("file"), "ours\n");
     }
@@ -134,15 +127,7 @@ TEST_F(MergeDriverFailure, IsLibGit2sWhenASideCannotBeRead)
         std::filesystem::copy(repository_ / ".git/objects", copy,
                               std::filesystem::copy_options::recursive);
         removeObject(revision);
-        try
-        {
-            mergeOrThrow();
-            ADD_FAILURE() << "no exception";
-        }
-        catch (const LibGit2Exception &exception)
-        {
-            EXPECT_EQ(exception.getError().getCode(), GIT_ENOTFOUND) << revision;
-        }
+        EXPECT_EQ(failureOf([this] { mergeOrThrow(); }).code, GIT_ENOTFOUND) << revision;
         repository_.remove(".git/objects");
         std::filesystem::rename(copy, repository_ / ".git/objects");
     }
@@ -151,34 +136,10 @@ TEST_F(MergeDriverFailure, IsLibGit2sWhenASideCannotBeRead)
 
 TEST_F(MergeDriverFailure, IsLibGit2sWhenTheConfigurationCannotBeRead)
 {
-    diverge(
-        [this]
-        {
-            repository_.write(".gitattributes", "* merge=tool\n");
-            repository_.write("a", "base\n");
-            repository_.write("b", "base\n");
-        },
-        [this]
-        {
-            repository_.write("a", "ours\n");
-            repository_.write("b", "ours\n");
-        },
-        [this]
-        {
-            repository_.write("a", "theirs\n");
-            repository_.write("b", "theirs\n");
-        });
+    makeConflicts({"a", "b"}, "* merge=tool\n");
     const std::string config = repository_ / ".git/config";
     defineScript("tool", "test \"$5\" = a && echo '[broken' >>" + config);
-    try
-    {
-        mergeOrThrow();
-        ADD_FAILURE() << "no exception";
-    }
-    catch (const LibGit2Exception &exception)
-    {
-        EXPECT_EQ(exception.getError().getErrorClass(), GIT_ERROR_CONFIG);
-    }
+    EXPECT_EQ(failureOf([&] { mergeOrThrow(); }).errorClass, GIT_ERROR_CONFIG);
 }
 
 TEST_F(MergeDriverFailure, IsTheStreamsWhenTheFileOfOursHasBecomeAFolder)
@@ -212,23 +173,7 @@ TEST_F(MergeDriverFailure, EndsTheMergeWithTheCodeOfACallback)
 
 TEST_F(MergeDriverFailure, StopsTheMergeAtTheFirstFile)
 {
-    diverge(
-        [this]
-        {
-            repository_.write(".gitattributes", "a merge=broken\nb merge=tool\n");
-            repository_.write("a", "base\n");
-            repository_.write("b", "base\n");
-        },
-        [this]
-        {
-            repository_.write("a", "ours\n");
-            repository_.write("b", "ours\n");
-        },
-        [this]
-        {
-            repository_.write("a", "theirs\n");
-            repository_.write("b", "theirs\n");
-        });
+    makeConflicts({"a", "b"}, "a merge=broken\nb merge=tool\n");
     const std::string mark = folder() / "mark";
     define("broken", "/nowhere/tool");
     defineScript("tool", "echo run >" + mark);

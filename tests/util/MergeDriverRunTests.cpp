@@ -3,8 +3,10 @@
 #include <algorithm>
 #include <cstddef>
 #include <filesystem>
+#include <ostream>
 #include <sstream>
 #include <string>
+#include <vector>
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
@@ -31,15 +33,6 @@ class MergeDriverRun : public vclink::test::MergeDriverTest
         return Scripts::read(out);
     }
 };
-
-TEST_F(MergeDriverRun, TakesTheResultFromTheFileOfOurs)
-{
-    makeConflict();
-    defineScript("tool", "cat \"$1\" \"$3\" >>\"$2\"");
-    EXPECT_EQ(merge(), 0);
-    EXPECT_EQ(staged("file"), "ours\nbase\ntheirs\n");
-    EXPECT_EQ(repository_.read("file"), "ours\nbase\ntheirs\n");
-}
 
 TEST_F(MergeDriverRun, WorksUnderAnyNameThatHasAKey)
 {
@@ -78,48 +71,45 @@ TEST_F(MergeDriverRun, LeavesAConflictWhenASignalEndsTheCommand)
     EXPECT_TRUE(isInConflict("file"));
 }
 
-TEST_F(MergeDriverRun, TakesOursWhenTheCommandDoesNothing)
+/// A command, and what the merge makes of the file.
+struct RunCase
+{
+    const char *sentence;
+    const char *script;
+    std::string merged;
+};
+
+std::ostream &operator<<(std::ostream &stream, const RunCase &run)
+{
+    return stream << run.script;
+}
+
+class MergeDriverResult : public MergeDriverRun, public testing::WithParamInterface<RunCase>
+{
+};
+
+TEST_P(MergeDriverResult, Is)
 {
     makeConflict();
-    defineScript("tool", ":");
+    defineScript("tool", GetParam().script);
     EXPECT_EQ(merge(), 0);
     EXPECT_FALSE(isInConflict("file"));
-    EXPECT_EQ(staged("file"), "ours\n");
+    EXPECT_EQ(staged("file"), GetParam().merged);
+    EXPECT_EQ(repository_.read("file"), GetParam().merged);
 }
 
-TEST_F(MergeDriverRun, TakesAnEmptyFileWhenTheCommandRemovesOurs)
-{
-    makeConflict();
-    defineScript("tool", "rm \"$2\"");
-    EXPECT_EQ(merge(), 0);
-    EXPECT_FALSE(isInConflict("file"));
-    EXPECT_EQ(staged("file"), "");
-    EXPECT_EQ(repository_.read("file"), "");
-}
+const RunCase runResults[]{
+    {"WhatTheCommandWroteToTheFileOfOurs", "cat \"$1\" \"$3\" >>\"$2\"", "ours\nbase\ntheirs\n"},
+    {"OursIfTheCommandDoesNothing", ":", "ours\n"},
+    {"EmptyIfTheCommandRemovesOurs", "rm \"$2\"", ""},
+    {"EmptyIfTheCommandEmptiesOurs", ": >\"$2\"", ""},
+    {"AFileThatTheCommandHasPutInThePlaceOfOurs", "echo other >\"$2.new\"; mv \"$2.new\" \"$2\"",
+     "other\n"},
+    {"TheBytesAsTheyAre", "printf 'a\\r\\n\\000\\377\\r' >\"$2\"", std::string("a\r\n\0\377\r", 6)},
+};
 
-TEST_F(MergeDriverRun, TakesAnEmptyFileWhenTheCommandEmptiesOurs)
-{
-    makeConflict();
-    defineScript("tool", ": >\"$2\"");
-    EXPECT_EQ(merge(), 0);
-    EXPECT_EQ(staged("file"), "");
-}
-
-TEST_F(MergeDriverRun, TakesAFileThatTheCommandHasPutInThePlaceOfOurs)
-{
-    makeConflict();
-    defineScript("tool", "echo other >\"$2.new\"; mv \"$2.new\" \"$2\"");
-    EXPECT_EQ(merge(), 0);
-    EXPECT_EQ(staged("file"), "other\n");
-}
-
-TEST_F(MergeDriverRun, TakesBytesAsTheyAre)
-{
-    makeConflict();
-    defineScript("tool", "printf 'a\\r\\n\\000\\377\\r' >\"$2\"");
-    EXPECT_EQ(merge(), 0);
-    EXPECT_EQ(staged("file"), std::string("a\r\n\0\377\r", 6));
-}
+INSTANTIATE_TEST_SUITE_P(TheMerge, MergeDriverResult, testing::ValuesIn(runResults),
+                         [](const auto &test) { return test.param.sentence; });
 
 TEST_F(MergeDriverRun, GivesTheCommandTheThreeSides)
 {
@@ -138,14 +128,7 @@ TEST_F(MergeDriverRun, GivesTheMarkerSizeAndThePath)
 
 TEST_F(MergeDriverRun, GivesAPathThatHasABlankAsTwoWords)
 {
-    diverge(
-        [this]
-        {
-            repository_.write(".gitattributes", "* merge=tool\n");
-            repository_.write("a folder/file", "base\n");
-        },
-        [this] { repository_.write("a folder/file", "ours\n"); },
-        [this] { repository_.write("a folder/file", "theirs\n"); });
+    makeConflicts({"a folder/file"}, "* merge=tool\n");
     const std::string out = folder() / "arguments";
     define("tool", scripts_.shell("printf '%s|' \"$@\" >" + out) + " %P \"%P\"");
     EXPECT_EQ(merge(), 0);
@@ -282,23 +265,7 @@ TEST_F(MergeDriverRun, IsAskedForASymbolicLinksTarget)
 
 TEST_F(MergeDriverRun, RunsOnceForEachFileOneAfterTheOther)
 {
-    diverge(
-        [this]
-        {
-            repository_.write(".gitattributes", "* merge=tool\n");
-            for (const char *name : {"a", "b", "c"})
-                repository_.write(name, "base\n");
-        },
-        [this]
-        {
-            for (const char *name : {"a", "b", "c"})
-                repository_.write(name, "ours\n");
-        },
-        [this]
-        {
-            for (const char *name : {"a", "b", "c"})
-                repository_.write(name, "theirs\n");
-        });
+    makeConflicts({"a", "b", "c"}, "* merge=tool\n");
     const std::string out = folder() / "order";
     defineScript("tool", "echo \"begin $5\" >>" + out + "; test \"$5\" = b || echo \"$5\" >\"$2\"" +
                              "; echo \"end $5\" >>" + out + "; test \"$5\" != b");
@@ -308,5 +275,101 @@ TEST_F(MergeDriverRun, RunsOnceForEachFileOneAfterTheOther)
     EXPECT_TRUE(isInConflict("b"));
     EXPECT_EQ(staged("c"), "c\n");
 }
+
+/// Enough lines for a rename to be found.
+std::string content(const std::string &first)
+{
+    return first + "\n2\n3\n4\n5\n6\n7\n8\n9\n10\n";
+}
+
+struct Side
+{
+    std::string name = "file";
+    unsigned mode = 0644;
+};
+
+/// The sides of a file, and its entries in the index that the merge makes, each mode, stage and
+/// name.
+struct SidesCase
+{
+    const char *sentence;
+    Side ours;
+    Side theirs;
+    std::vector<std::string> entries;
+    /// what the command is told; empty if it is not asked
+    std::string path;
+    unsigned baseMode = 0644;
+};
+
+std::ostream &operator<<(std::ostream &stream, const SidesCase &sides)
+{
+    return stream << sides.ours.name << " and " << sides.theirs.name;
+}
+
+class MergeDriverPath : public vclink::test::MergeDriverTest,
+                        public testing::WithParamInterface<SidesCase>
+{
+  protected:
+    /// Merges a file that each side has edited, and moved or made executable as told.
+    void mergeSides(const Side &ours, const Side &theirs, unsigned baseMode)
+    {
+        const auto edit = [this](const Side &side, const std::string &first)
+        {
+            if (side.name != "file")
+                repository_.git({"mv", "file", side.name});
+            repository_.write(side.name, content(first));
+            repository_.setMode(side.name, side.mode);
+        };
+        diverge(
+            [&]
+            {
+                repository_.write(".gitattributes", "* merge=tool\n");
+                repository_.write("file", content("base"));
+                repository_.setMode("file", baseMode);
+            },
+            [&] { edit(ours, "ours"); }, [&] { edit(theirs, "theirs"); });
+        defineScript("tool", "echo \"$5\" >" + path_ + "; echo merged >\"$2\"");
+        EXPECT_EQ(merge(), 0);
+    }
+
+    std::string path_ = folder() / "path";
+};
+
+TEST_P(MergeDriverPath, AndModeAre)
+{
+    mergeSides(GetParam().ours, GetParam().theirs, GetParam().baseMode);
+    std::vector<std::string> expected{"100644\t0\t.gitattributes"};
+    expected.insert(expected.end(), GetParam().entries.begin(), GetParam().entries.end());
+    EXPECT_EQ(index(), expected);
+    EXPECT_EQ(Scripts::read(path_), GetParam().path);
+    if (!GetParam().path.empty())
+    {
+        EXPECT_EQ(staged(expected.back().substr(9)), "merged\n");
+    }
+}
+
+const SidesCase mergedSides[]{
+    {"TheOnes", {}, {}, {"100644\t0\tfile"}, "file\n"},
+    {"TheNameThatTheirsHasGiven", {}, {"new", 0644}, {"100644\t0\tnew"}, "new\n"},
+    {"TheNameThatOursHasGiven", {"new", 0644}, {}, {"100644\t0\tnew"}, "new\n"},
+    {"TheModeThatTheirsHasGiven", {}, {"file", 0755}, {"100755\t0\tfile"}, "file\n"},
+    {"TheModeThatOursHasGiven", {"file", 0755}, {}, {"100755\t0\tfile"}, "file\n"},
+    {"WithoutTheExecutableBitThatOneSideHasTaken",
+     {"file", 0644},
+     {"file", 0755},
+     {"100644\t0\tfile"},
+     "file\n",
+     0755},
+    {"TheNameOfOursAndTheModeOfTheirs", {"new", 0644}, {"file", 0755}, {"100755\t0\tnew"}, "new\n"},
+    {"TheModeOfOursAndTheNameOfTheirs", {"file", 0755}, {"new", 0644}, {"100755\t0\tnew"}, "new\n"},
+    {"InConflictIfBothHaveMovedTheFile",
+     {"new", 0644},
+     {"new", 0644},
+     {"100644\t1\tfile", "100644\t2\tnew", "100644\t3\tnew"},
+     ""},
+};
+
+INSTANTIATE_TEST_SUITE_P(TheMerged, MergeDriverPath, testing::ValuesIn(mergedSides),
+                         [](const auto &test) { return test.param.sentence; });
 
 } // namespace

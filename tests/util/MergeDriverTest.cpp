@@ -61,16 +61,24 @@ void MergeDriverTest::diverge(const std::function<void()> &base, const std::func
     repository_.commitAll("ours");
 }
 
+void MergeDriverTest::makeConflicts(const std::vector<std::string> &names,
+                                    const std::string &attributes)
+{
+    const auto writing = [&](const std::string &bytes)
+    {
+        return [this, &names, bytes]
+        {
+            for (const auto &name : names)
+                repository_.write(name, bytes);
+        };
+    };
+    repository_.write(".gitattributes", attributes);
+    diverge(writing("base\n"), writing("ours\n"), writing("theirs\n"));
+}
+
 void MergeDriverTest::makeConflict(const std::string &driver)
 {
-    diverge(
-        [&]
-        {
-            repository_.write(".gitattributes", "file merge=" + driver + '\n');
-            repository_.write("file", "base\n");
-        },
-        [&] { repository_.write("file", "ours\n"); },
-        [&] { repository_.write("file", "theirs\n"); });
+    makeConflicts({"file"}, "file merge=" + driver + "\n");
 }
 
 int MergeDriverTest::merge(TemporaryFiles files) const

@@ -54,6 +54,8 @@ class MergeDriverTest : public GitTest
     /// last two on branches of their own.
     void diverge(const std::function<void()> &base, const std::function<void()> &ours,
                  const std::function<void()> &theirs);
+    /// Conflicts in all of these files, under these attributes.
+    void makeConflicts(const std::vector<std::string> &names, const std::string &attributes);
     /// A conflict in "file", whose merge attribute names `driver`.
     void makeConflict(const std::string &driver = "tool");
 

@@ -12,6 +12,7 @@
 #include <sys/stat.h>
 
 #include "error/errorUtil/GitResult.hpp"
+#include "support/Failure.hpp"
 #include "support/GitTest.hpp"
 #include "support/LibGit2Session.hpp"
 #include "support/LogCapture.hpp"
@@ -20,7 +21,6 @@
 #include "support/SignalAction.hpp"
 #include "support/text.hpp"
 #include "util/temporaryFile.hpp"
-#include "vclink/git/LibGit2Exception.hpp"
 
 namespace
 {
@@ -111,15 +111,10 @@ TEST_F(TemporaryFile, IsNotMadeForABlobThatIsMissing)
     const vclink::test::NothingLeft check(environment().temporary());
     git_index_entry entry = {};
     git_oid_fromstr(&entry.id, std::string(40, '1').c_str());
-    try
-    {
-        static_cast<void>(git::writeBlobToTemporaryFile(entry, opened.get()));
-        FAIL() << "no exception";
-    }
-    catch (const git::LibGit2Exception &exception)
-    {
-        EXPECT_EQ(exception.getError().getCode(), GIT_ENOTFOUND);
-    }
+    EXPECT_EQ(vclink::test::failureOf(
+                  [&] { static_cast<void>(git::writeBlobToTemporaryFile(entry, opened.get())); })
+                  .code,
+              GIT_ENOTFOUND);
 }
 
 TEST_F(TemporaryFile, IsRemoved)
