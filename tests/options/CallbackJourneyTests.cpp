@@ -14,6 +14,7 @@
 #include "options/Callbacks.hpp"
 #include "options/CancellationPoller.hpp"
 #include "options/gitRecords.hpp"
+#include "support/Failure.hpp"
 #include "support/GitTest.hpp"
 #include "support/LibGit2Session.hpp"
 #include "support/LogCapture.hpp"
@@ -26,6 +27,7 @@ namespace vclink::git
 namespace
 {
 
+using test::failureOf;
 using test::LogCapture;
 using testing::ElementsAre;
 using vclink::util::exception::CancelledOperationException;
@@ -223,15 +225,7 @@ TEST_F(CallbackJourney, CarriesAFailureOfLibGit2InsideTheCallback)
         acquire<git_repository>(git_repository_open, "/nowhere/at/all").value();
         return 0;
     };
-    try
-    {
-        walk(walker).value();
-        ADD_FAILURE() << "nothing was raised";
-    }
-    catch (const LibGit2Exception &exception)
-    {
-        EXPECT_EQ(exception.getError().getCode(), GIT_ENOTFOUND);
-    }
+    EXPECT_EQ(failureOf([&] { walk(walker).value(); }).code, GIT_ENOTFOUND);
 }
 
 TEST_F(CallbackJourney, GoesThroughAWalkInsideAWalk)

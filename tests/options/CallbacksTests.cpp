@@ -318,46 +318,31 @@ CoreFilter failAt(unsigned severity)
 
 class CallbackDeathTest : public Callback
 {
+  protected:
+    /// Expects that `call` ends the process if a record of this severity fails.
+    template <class Call> static void expectDeath(unsigned severity, Call call)
+    {
+        const LogCapture log;
+        EXPECT_DEATH(
+            {
+                const CoreFilter filter = failAt(severity);
+                call();
+            },
+            "terminate called.*logic_error");
+    }
 };
 
-TEST_F(CallbackDeathTest, EndsTheProcessWhenTheTraceOfItsEntryFails)
+TEST_F(CallbackDeathTest, EndsTheProcessWhenTheTraceOfItsEntryOrExitFails)
 {
-    const LogCapture log;
-    EXPECT_DEATH(
-        {
-            const CoreFilter filter = failAt(SeverityScopeEntry);
-            answerCallback("path", 1, &target);
-        },
-        "terminate called.*logic_error");
-}
-
-TEST_F(CallbackDeathTest, EndsTheProcessWhenTheTraceOfItsExitFails)
-{
-    const LogCapture log;
-    EXPECT_DEATH(
-        {
-            const CoreFilter filter = failAt(SeverityScopeExit);
-            answerCallback("path", 1, &target);
-        },
-        "terminate called.*logic_error");
+    for (const unsigned severity : {SeverityScopeEntry, SeverityScopeExit})
+        expectDeath(severity, [this] { answerCallback("path", 1, &target); });
 }
 
 TEST_F(CallbackDeathTest, EndsTheProcessWhenTheReportFails)
 {
-    const LogCapture log;
-    EXPECT_DEATH(
-        {
-            const CoreFilter filter = failAt(SeverityException);
-            answerThrowing(1);
-        },
-        "terminate called.*logic_error");
+    expectDeath(SeverityException, [this] { answerThrowing(1); });
     target.body = []() -> int { throw 1; };
-    EXPECT_DEATH(
-        {
-            const CoreFilter filter = failAt(SeverityStackTrace);
-            noticeCallback("path", 1, &target);
-        },
-        "terminate called.*logic_error");
+    expectDeath(SeverityStackTrace, [this] { noticeCallback("path", 1, &target); });
 }
 
 } // namespace

@@ -124,16 +124,6 @@ TEST_F(CheckoutNotification, TakesANullPathForAnEmptyOne)
     EXPECT_THAT(log.messages(), ElementsAre("Checkout Notify : 2 ()"));
 }
 
-TEST_F(CheckoutNotification, WritesNothingWhenItsSeverityIsOff)
-{
-    const LogCapture log(~unsigned{SeverityProgress});
-    int opened = 0;
-    const CoreFilter filter([&opened](unsigned) { return ++opened > 0; });
-    EXPECT_EQ(notify(GIT_CHECKOUT_NOTIFY_UPDATED, "file"), 0);
-    EXPECT_THAT(log.records(), IsEmpty());
-    EXPECT_EQ(opened, 0) << "a record was begun";
-}
-
 TEST_F(CheckoutNotification, PollsBeforeAllElse)
 {
     const LogCapture log;
@@ -251,16 +241,6 @@ TEST_F(CheckoutProgress, TellsItsArgumentsInOneRecord)
                      " pathStr= completed_steps=18446744073709551615 total_steps=0")));
 }
 
-TEST_F(CheckoutProgress, WritesNothingWhenItsSeverityIsOff)
-{
-    const LogCapture log(~unsigned{SeverityParameter});
-    int opened = 0;
-    const CoreFilter filter([&opened](unsigned) { return ++opened > 0; });
-    EXPECT_EQ(callsOf("file", 1, 1).size(), 2u);
-    EXPECT_THAT(log.records(), IsEmpty());
-    EXPECT_EQ(opened, 0) << "a record was begun";
-}
-
 TEST_F(CheckoutProgress, AsksForTheDisplayAtEachStep)
 {
     test::RecordingProgressReporter other;
@@ -327,15 +307,23 @@ TEST_F(CheckoutPerfData, TellsTheCountsInOneRecord)
                                                        "18446744073709551615")));
 }
 
-TEST_F(CheckoutPerfData, WritesNothingWhenItsSeverityIsOff)
+/// How many records `call` begins while those of this severity are off.
+template <class Call> int recordsBegunWithout(unsigned severity, Call call)
 {
-    const LogCapture log(~unsigned{SeverityProgress});
-    int opened = 0;
-    const CoreFilter filter([&opened](unsigned) { return ++opened > 0; });
-    const git_checkout_perfdata data = makePerfData();
-    callbacks_.perfData(&data);
+    const LogCapture log(~severity);
+    int begun = 0;
+    const CoreFilter filter([&begun](unsigned) { return ++begun > 0; });
+    call();
     EXPECT_THAT(log.records(), IsEmpty());
-    EXPECT_EQ(opened, 0) << "a record was begun";
+    return begun;
+}
+
+TEST_F(CheckoutCallbacksTest, BeginNoRecordWhoseSeverityIsOff)
+{
+    const git_checkout_perfdata data = makePerfData();
+    EXPECT_EQ(recordsBegunWithout(SeverityProgress, [&] { notifyOfNothing(); }), 0);
+    EXPECT_EQ(recordsBegunWithout(SeverityProgress, [&] { callbacks_.perfData(&data); }), 0);
+    EXPECT_EQ(recordsBegunWithout(SeverityParameter, [&] { callsOf("file", 1, 1); }), 0);
 }
 
 TEST_F(CheckoutPerfData, NeitherReachesTheHostNorPolls)

@@ -1,5 +1,4 @@
 // SPDX-License-Identifier: MIT
-#include <cstring>
 #include <functional>
 #include <memory>
 #include <stdexcept>
@@ -20,7 +19,6 @@
 #include "support/TestInteractor.hpp"
 #include "support/libgit2/LibGit2Recorder.hpp"
 #include "vclink/git/GitOptionsFactory.hpp"
-#include "vclink/git/LibGit2Exception.hpp"
 #include "vclink/util/exception/CancelledOperationException.hpp"
 
 namespace vclink::git
@@ -29,19 +27,11 @@ namespace
 {
 
 using test::bytesOf;
+using test::initialised;
 using test::LogCapture;
 using testing::ElementsAre;
 using testing::StartsWith;
 using vclink::util::exception::CancelledOperationException;
-
-/// The record as libgit2 makes it.
-template <class Record> Record initialised(int (*function)(Record *, unsigned))
-{
-    Record record;
-    std::memset(&record, 0, sizeof(record));
-    EXPECT_EQ(function(&record, 1), 0);
-    return record;
-}
 
 class RemoteRecords : public testing::Test
 {
@@ -88,35 +78,6 @@ class RemoteRecords : public testing::Test
         EXPECT_EQ(record.push_update_reference("name", "no", set), 0);
         EXPECT_EQ(record.push_negotiation(nullptr, 7, set), 0);
     }
-    /// Each of the init functions that `convert` calls, made to fail, ends it with the failure.
-    void expectEachInitToRaise(std::size_t count, const std::function<void()> &convert)
-    {
-        const test::HermeticLibGit2 libgit2;
-        calls_.clear();
-        convert();
-        const std::vector<std::string> called = calls_.steps();
-        EXPECT_EQ(called.size(), count);
-        std::vector<std::string> expected;
-        for (const auto &name : called)
-        {
-            calls_.clear();
-            calls_.fail({{name, -1}});
-            try
-            {
-                convert();
-                ADD_FAILURE() << name;
-            }
-            catch (const LibGit2Exception &exception)
-            {
-                EXPECT_EQ(exception.getError().getCode(), -1);
-                EXPECT_EQ(exception.getError().getErrorClass(), GIT_ERROR_OS);
-                EXPECT_EQ(exception.getError().getMessage(), u"injected");
-            }
-            expected.push_back(name);
-            EXPECT_EQ(calls_.steps(), expected);
-        }
-    }
-
     test::LibGit2Recorder calls_;
 
     const std::shared_ptr<test::TestInteractor> interactor_ =
@@ -230,11 +191,6 @@ TEST_F(ToGitRemoteCallbacks, ParksWhatTheLogRaises)
     EXPECT_THROW(std::rethrow_exception(pendingCallbackException()), std::runtime_error);
 }
 
-TEST_F(ToGitRemoteCallbacks, RaisesTheFailureOfLibGit2)
-{
-    expectEachInitToRaise(1, [this] { remoteRecord(); });
-}
-
 TEST_F(ToGitFetchOptions, SetsTheProxyAndThenTheCallbacks)
 {
     git_fetch_options expected = initialised(git_fetch_options_init);
@@ -256,11 +212,6 @@ TEST_F(ToGitFetchOptions, LeavesTagsAndPruningToTheConfiguration)
     EXPECT_EQ(record.custom_headers.count, 0u);
 }
 
-TEST_F(ToGitFetchOptions, RaisesTheFailureOfLibGit2)
-{
-    expectEachInitToRaise(3, [this] { toGitFetchOptions(FetchOptions(), *callbacks_); });
-}
-
 TEST_F(ToGitPushOptions, SetsTheThreadsThenTheCallbacksAndTheProxy)
 {
     git_push_options expected = initialised(git_push_options_init);
@@ -279,11 +230,6 @@ TEST_F(ToGitPushOptions, SetsTheThreadsThenTheCallbacksAndTheProxy)
                                 "git_proxy_options_init"));
     }
     EXPECT_EQ(toGitPushOptions(PushOptions(), *callbacks_).pb_parallelism, 1u);
-}
-
-TEST_F(ToGitPushOptions, RaisesTheFailureOfLibGit2)
-{
-    expectEachInitToRaise(3, [this] { toGitPushOptions(PushOptions(), *callbacks_); });
 }
 
 TEST_F(ToGitCloneOptions, SetsTheRecordsOfTheCheckoutAndOfTheFetch)
@@ -337,11 +283,6 @@ TEST_F(ToGitCloneOptions, KeepsNoBranchOfItsOwn)
     const git_clone_options record = toGitCloneOptions(options, *callbacks_);
     options.checkoutBranch->front() = 'p';
     EXPECT_STREQ(record.checkout_branch, "pain");
-}
-
-TEST_F(ToGitCloneOptions, RaisesTheFailureOfLibGit2)
-{
-    expectEachInitToRaise(5, [this] { toGitCloneOptions(CloneOptions(), *callbacks_); });
 }
 
 } // namespace

@@ -4,6 +4,8 @@
 #include <cstring>
 #include <vector>
 
+#include <gtest/gtest.h>
+
 namespace vclink::test
 {
 
@@ -13,6 +15,15 @@ template <class Record> std::vector<unsigned char> bytesOf(const Record &record)
     std::vector<unsigned char> bytes(sizeof(record));
     std::memcpy(bytes.data(), &record, sizeof(record));
     return bytes;
+}
+
+/// The record as libgit2 makes it.
+template <class Record> Record initialised(int (*function)(Record *, unsigned))
+{
+    Record record;
+    std::memset(&record, 0, sizeof(record));
+    EXPECT_EQ(function(&record, 1), 0);
+    return record;
 }
 
 } // namespace vclink::test
