@@ -20,6 +20,7 @@
 #include "options/gitRecords.hpp"
 #include "util/lock/IndexLock.hpp"
 #include "util/lock/referenceLocks.hpp"
+#include "util/repository/objectIds.hpp"
 #include "util/repository/repository.hpp"
 
 namespace vclink::git
@@ -104,7 +105,7 @@ std::string BasicBranchManager::getRevision(const std::string &revision) const
 {
     refuseNul(revision);
     const OwnedHandle<git_repository> repository = adapter_.getRepository();
-    std::array<char, GIT_OID_HEXSZ> digits{};
+    std::array<char, idTextSize> digits{};
     git_oid_fmt(digits.data(), revparseId(revision, repository.get()));
     return std::string(digits.data(), digits.size());
 }

@@ -12,6 +12,7 @@
 #include <unistd.h>
 
 #include "error/errorUtil/raiseSystemError.hpp"
+#include "util/repository/objectIds.hpp"
 #include "util/scope/FileDescriptor.hpp"
 
 namespace vclink::git
@@ -19,7 +20,7 @@ namespace vclink::git
 namespace
 {
 
-constexpr std::size_t idLineSize = GIT_OID_HEXSZ + 1;
+constexpr std::size_t idLineSize = idTextSize + 1;
 constexpr std::size_t markerSize = 2 * idLineSize;
 
 std::string markerPath(git_repository *repository)

@@ -23,7 +23,7 @@ namespace vclink::git
 void restoreMergeHead(git_repository *repository, const git_oid &theirs)
 {
     const std::string path = git_repository_path(repository) + std::string("MERGE_HEAD");
-    std::string line(GIT_OID_HEXSZ + 1, '\n');
+    std::string line(idTextSize + 1, '\n');
     git_oid_fmt(line.data(), &theirs);
     const FileDescriptor file(
         ::open(path.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, DEFFILEMODE));

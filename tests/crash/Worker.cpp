@@ -7,7 +7,7 @@
 #include <utility>
 #include <vector>
 
-#include <git2/oid.h>
+#include <git2.h>
 #include <unistd.h>
 
 #include "support/text.hpp"

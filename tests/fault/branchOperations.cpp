@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include <array>
 
-#include <git2/oid.h>
+#include <git2.h>
 
 #include "Operation.hpp"
 #include "repositories.hpp"

@@ -2,12 +2,16 @@
 #pragma once
 
 #include <algorithm>
+#include <cstddef>
 #include <iterator>
 
 #include <git2/oid.h>
 
 namespace vclink::git
 {
+
+/// The digits of an id. libgit2's own name for it depends on the release.
+constexpr std::size_t idTextSize = 2 * sizeof(git_oid::id);
 
 /// As git_oid_equal, without a call for each of many files.
 inline bool isSameId(const git_oid &left, const git_oid &right) noexcept
