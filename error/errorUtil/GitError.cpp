@@ -1,17 +1,30 @@
 // SPDX-License-Identifier: MIT
 #include "vclink/git/GitError.hpp"
 
+#include <string_view>
+
 #include <git2/errors.h>
 
 #include "fl/i18n/convert.hpp"
 
 namespace vclink::git
 {
+namespace
+{
+
+/// Whether libgit2 has told nothing: there is no record, or since 1.8 one that says so.
+bool isSilent(const git_error *record) noexcept
+{
+    return record == nullptr ||
+           (record->klass == GIT_ERROR_NONE && std::string_view(record->message) == "no error");
+}
+
+} // namespace
 
 GitError::GitError(int code) : code_(code)
 {
     const git_error *const record = git_error_last();
-    if (code == 0 || record == nullptr)
+    if (code == 0 || isSilent(record))
     {
         return;
     }
