@@ -2,49 +2,14 @@
 #include "StagingTest.hpp"
 
 #include <filesystem>
-#include <ostream>
 #include <sstream>
-#include <tuple>
 
 #include "support/UnprivilegedUser.hpp"
-#include "vclink/git/LibGit2Exception.hpp"
 
 namespace vclink::test
 {
 
 namespace fs = std::filesystem;
-
-bool operator==(const Failure &left, const Failure &right)
-{
-    return std::tie(left.code, left.errorClass, left.text) ==
-           std::tie(right.code, right.errorClass, right.text);
-}
-
-std::ostream &operator<<(std::ostream &stream, const Failure &failure)
-{
-    return stream << "code " << failure.code << ", class " << failure.errorClass << ": "
-                  << failure.text;
-}
-
-std::string printed(const Failure &failure)
-{
-    return testing::PrintToString(failure);
-}
-
-Failure failureOf(const std::function<void()> &action)
-{
-    try
-    {
-        action();
-        ADD_FAILURE() << "no exception";
-        return {};
-    }
-    catch (const git::LibGit2Exception &exception)
-    {
-        const git::GitError &error = exception.getError();
-        return {error.getCode(), error.getErrorClass(), asUtf8(error.getMessage())};
-    }
-}
 
 StagingTest::StagingTest()
 {

@@ -2,7 +2,6 @@
 #pragma once
 
 #include <functional>
-#include <iosfwd>
 #include <string>
 #include <typeinfo>
 #include <vector>
@@ -12,28 +11,13 @@
 
 #include "AdapterTest.hpp"
 #include "error/raise.hpp"
+#include "support/Failure.hpp"
 #include "support/RepositoryState.hpp"
 #include "support/text.hpp"
 #include "vclink/git/messageIdentifiers.hpp"
 
 namespace vclink::test
 {
-
-/// What a LibGit2Exception tells.
-struct Failure
-{
-    int code = 0;
-    int errorClass = 0;
-    std::string text;
-};
-
-bool operator==(const Failure &left, const Failure &right);
-std::ostream &operator<<(std::ostream &stream, const Failure &failure);
-/// As text.
-std::string printed(const Failure &failure);
-
-/// The LibGit2Exception that `action` raises; the test fails when it raises none.
-Failure failureOf(const std::function<void()> &action);
 
 /// Expects that `action` raises exactly the class of the identifier, with these paths as the report
 /// that is its argument.
