@@ -56,6 +56,7 @@ const std::vector<SurroundingDifference> &surroundingDifferences()
     const Names addedMerge{"merge into added submodules"};
     const Names removedMerge{"merge into removed submodules"};
     const Names replacedMerge{"merge into replaced submodules"};
+    const Names movedOrAdded{"merge into moved submodules", "merge into added submodules"};
     const Names otherKinds{"file in the submodule's place", "link in the submodule's place",
                            "pipe in the submodule's place"};
     static const std::vector<SurroundingDifference> differences{
@@ -149,6 +150,10 @@ const std::vector<SurroundingDifference> &surroundingDifferences()
          conflicts,
          refusal,
          "libgit2 takes the missing folder of a submodule for an edit"},
+        {movedOrAdded, otherKinds, "a submodule *", through, refusal,
+         "libgit2 takes what is in a submodule's place for an edit"},
+        {movedOrAdded, otherKinds, "a submodule *", conflicts, refusal,
+         "libgit2 takes what is in a submodule's place for an edit"},
         {removedMerge,
          {},
          "a submodule that they *",
@@ -343,6 +348,18 @@ const std::vector<SurroundingDifference> &surroundingDifferences()
          refusal,
          through,
          "both sides have removed the submodule; git refuses over whatever is staged"},
+        {movedMerge,
+         {"taken out and removed"},
+         "a submodule that they renamed",
+         refusal,
+         through,
+         "both sides have removed the submodule; git refuses over whatever is staged"},
+        {movedOrAdded,
+         {"taken out and removed"},
+         "a submodule *",
+         refusal,
+         conflicts,
+         "nothing but a removal is staged, and the conflict can be solved by it"},
         // Both go on.
         {moduleMerge,
          {"submodule missing"},
@@ -356,7 +373,7 @@ const std::vector<SurroundingDifference> &surroundingDifferences()
          conflicts,
          otherwise,
          "git gives the file another name; libgit2 leaves both at one"},
-        {{"merge into moved submodules", "merge into added submodules"},
+        {movedOrAdded,
          {"submodule missing"},
          "a submodule that *",
          through,
