@@ -9,9 +9,11 @@
 #include "commands.hpp"
 #include "links.hpp"
 #include "namedPaths.hpp"
+#include "names.hpp"
 #include "refusals.hpp"
 #include "runStoppable.hpp"
 #include "states.hpp"
+#include "texts.hpp"
 
 namespace vclink::shell
 {
@@ -23,22 +25,29 @@ class AddCommand : public Command
   public:
     void declare(CLI::App &line) override
     {
-        paths_ = declarePaths(line, "New files, and folders: all new files below them")->required();
-        line.footer("The files are in the next commit. Ignored files are left out below a folder, "
-                    "and refused by\n"
-                    "name. So is a file that Git tracks already: its changes are in the next "
-                    "commit anyway, see\n"
-                    "commit. When one is refused, nothing is added. A symbolic link that leads "
-                    "somewhere can't be\n"
-                    "added: it would be followed.");
+        paths_ = declarePaths(line, say("New files, and folders: all new files below them"));
+        line.add_flag("-A,--all", addsAll_, say("All new files of the working copy"));
+        line.callback(
+            [this]
+            {
+                if (paths_->empty() && !addsAll_)
+                {
+                    throw CLI::RequiredError("PATH");
+                }
+            });
+        line.footer(say("The files are in the next commit. A folder's ignored files are left out, "
+                        "and a name of one is\nrefused; so is a file that Git tracks already: its "
+                        "changes are in the next commit anyway."));
     }
 
     ExitStatus run(Session &session) override
     {
         CMAdapter &adapter = session.adapter();
         const upath &root = adapter.getRootFolder();
-        const std::vector<NamedPath> paths = lookUp(adapter, paths_->results());
-        refuseUnless("Nothing was added", paths,
+        const std::vector<NamedPath> paths =
+            lookUp(adapter, addsAll_ ? std::vector<std::string>{nativePath(root).string()}
+                                     : paths_->results());
+        refuseUnless(say("Nothing was added"), paths,
                      [&root](const NamedPath &named) {
                          return named.states.empty() ? explainAbsence(root, named)
                                                      : explainLink(named, "git add");
@@ -50,17 +59,18 @@ class AddCommand : public Command
             files.merge(chosen);
         }
         const std::vector<upath> list = addressable(filterFollowed(files, root, false), root);
-        refuseStrays("Nothing was added", adapter, paths, list,
-                     [](FileState::State) { return true; });
-        const ExitStatus status = runStoppable(session, [&] { adapter.addFiles(list); });
+        refuseStrays(say("Nothing was added"), adapter, paths, list,
+                     [](FileState::State state) { return isNew(state) || isInConflict(state); });
+        const ExitStatus status = runStoppable(session, Stops::Never,
+                                               [&] { adapter.addFiles(literalNames(list, root)); });
         if (status != Done)
         {
             return status;
         }
         const FileStateMap leftOut = findLeftOut(adapter, files, isNew);
-        remark(files.empty() ? "There is no new file to add."
-                             : "Added " + countFiles(files.size() - leftOut.size()) + '.');
-        return tellLeftOut("Others were not added", root, leftOut);
+        remark(files.empty() ? say("There is no new file to add.")
+                             : say("Added %1%.", countFiles(files.size() - leftOut.size())));
+        return tellLeftOut(say("Others were not added"), root, leftOut);
     }
 
   private:
@@ -70,6 +80,7 @@ class AddCommand : public Command
     }
 
     const CLI::Option *paths_ = nullptr;
+    bool addsAll_ = false;
 };
 
 } // namespace

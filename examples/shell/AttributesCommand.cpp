@@ -12,6 +12,7 @@
 #include "failures.hpp"
 #include "fl/i18n/convert.hpp"
 #include "names.hpp"
+#include "texts.hpp"
 #include "vclink/git/GitAttributes.hpp"
 
 namespace vclink::shell
@@ -36,8 +37,9 @@ upath findBelow(const upath &root, const std::string &argument)
             return makePath(rest);
         }
     }
-    throw ShellFailure(quoteName(fl::i18n::utf8_to_ustring(argument)) +
-                       " is no file in the working copy " + nativePath(root).string() + '.');
+    throw ShellFailure(say("%1% is not in the working copy %2%.",
+                           quoteName(fl::i18n::utf8_to_ustring(argument)),
+                           nativePath(root).string()));
 }
 
 class AttributesCommand : public Command
@@ -45,11 +47,10 @@ class AttributesCommand : public Command
   public:
     void declare(CLI::App &line) override
     {
-        path_ = declareName(line, "PATH", "A file, which need not exist")->required();
-        names_ = declareNames(line, "NAME", "Attributes")->required();
-        line.footer("One line for each attribute, as it would stand in a .gitattributes file: "
-                    "\"NAME\", \"-NAME\",\n"
-                    "\"NAME=VALUE\", or \"!NAME\" where it is not specified.");
+        path_ = declareName(line, "PATH", say("A file, which need not exist"))->required();
+        names_ = declareNames(line, "NAME", say("Attributes"))->required();
+        line.footer(say("One line for each attribute, as a .gitattributes file has it: \"NAME\", "
+                        "\"-NAME\", \"NAME=VALUE\",\nor \"!NAME\" if it is not specified."));
     }
 
     ExitStatus run(Session &session) override

@@ -7,39 +7,74 @@
 #include "Session.hpp"
 #include "arguments.hpp"
 #include "commands.hpp"
+#include "failures.hpp"
+#include "revisions.hpp"
 #include "runStoppable.hpp"
+#include "texts.hpp"
 #include "vclink/git/BranchManager.hpp"
+#include "vclink/git/LibGit2Exception.hpp"
 
 namespace vclink::shell
 {
 namespace
 {
 
+/// Whether a text means a commit, and is not the name of a reference.
+bool isUnnamedCommit(const git::BranchManager &manager, const std::string &text)
+{
+    const auto exists = [&](const char *folder) { return findRevision(manager, folder + text); };
+    // No name of a reference has these.
+    const bool isNamed = text.find_first_of("~^:") == std::string::npos &&
+                         (text == "HEAD" || exists("refs/heads/") || exists("refs/tags/") ||
+                          exists("refs/remotes/"));
+    return !isNamed && findRevision(manager, text + "^{commit}");
+}
+
 class BranchCommand : public Command
 {
   public:
     void declare(CLI::App &line) override
     {
-        name_ = declareName(line, "NAME", "The branch")->required();
-        start_ = declareName(line, "START",
-                             "What a new branch begins at: a branch, or a tag that "
-                             "is no object\nof its own");
-        line.add_flag("-d", deletes_, "Delete the branch");
+        name_ = declareName(line, "NAME", say("The branch"))->required();
+        start_ =
+            declareName(line, "START",
+                        say("Where the new branch begins: a branch, or a tag that is no object "
+                            "of\nits own; HEAD if it is left out"));
+        line.add_flag("-d", deletes_, say("Delete the branch, merged or not"));
         line.callback([this] { checkStart(); });
-        line.footer("Makes a branch, or deletes one, merged or not. The current branch stays what "
-                    "it is, and can't\nbe deleted.");
+        line.footer(say("Makes or deletes a branch. The current branch stays the same, and can't "
+                        "be deleted."));
     }
 
     ExitStatus run(Session &session) override
     {
         const auto manager = git::BranchManager::create(session.adapter());
         const std::string name = name_->results().front();
-        const ExitStatus status = runStoppable(session, [&] { act(*manager, name); });
-        if (status == Done)
+        // The way back from a deletion.
+        const std::string tip = findRevision(*manager, "refs/heads/" + name).value_or("");
+        try
         {
-            remark((deletes_ ? "Deleted the branch " : "Made the branch ") + name + '.');
+            const ExitStatus status =
+                runStoppable(session, Stops::Never, [&] { act(*manager, name); });
+            if (status == Done)
+            {
+                remark(deletes_ ? say("Deleted the branch %1%, which was at %2%.", name, tip)
+                                : say("Made the branch %1%.", name));
+            }
+            return status;
         }
-        return status;
+        catch (const git::LibGit2Exception &)
+        {
+            if (deletes_ || !isUnnamedCommit(*manager, start()))
+            {
+                throw;
+            }
+            reportFailure();
+            complain(say("START must be the name of a branch or a tag. For any other commit, use "
+                         "\"git branch %1% %2%\".",
+                         name, start()));
+            return Failed;
+        }
     }
 
   private:
@@ -51,19 +86,20 @@ class BranchCommand : public Command
         }
         else
         {
-            manager.createBranch(git::BranchParameters(name, start_->results().front()));
+            manager.createBranch(git::BranchParameters(name, start()));
         }
+    }
+
+    std::string start() const
+    {
+        return start_->empty() ? "HEAD" : start_->results().front();
     }
 
     void checkStart() const
     {
         if (deletes_ && !start_->empty())
         {
-            throw CLI::ValidationError("START", "it is not for a branch to delete");
-        }
-        if (!deletes_ && start_->empty())
-        {
-            throw CLI::RequiredError("START");
+            throw CLI::ValidationError("START", say("is not for a branch to delete"));
         }
     }
 

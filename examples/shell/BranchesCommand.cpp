@@ -10,6 +10,7 @@
 #include "commands.hpp"
 #include "fl/i18n/convert.hpp"
 #include "names.hpp"
+#include "texts.hpp"
 #include "vclink/git/BranchManager.hpp"
 
 namespace vclink::shell
@@ -27,9 +28,11 @@ class BranchesCommand : public Command
   public:
     void declare(CLI::App &line) override
     {
-        line.add_flag("-r", showsRemote_, "Those that were fetched from remote repositories");
-        line.add_flag("-z", endWithNul_, "End each line with NUL, and write names byte for byte");
-        line.footer("One line for each branch: its short name, which the other commands take.");
+        line.add_flag("-r", showsRemote_, say("Those that were fetched from remote repositories"));
+        line.add_flag("-z", endWithNul_,
+                      say("End each line with NUL, and write names byte for byte"));
+        line.footer(
+            say("One line for each branch: its short name, which the other commands take."));
     }
 
     ExitStatus run(Session &session) override
@@ -41,11 +44,17 @@ class BranchesCommand : public Command
         for (const git::BranchPointer &branch : branches)
         {
             const std::string name = shortName(branch.getName(), folder);
-            session.output().write(endWithNul_ ? name + '\0'
-                                               : quoteName(fl::i18n::utf8_to_ustring(name)) + '\n');
+            if (endWithNul_)
+            {
+                session.output().writeRaw(name + '\0');
+            }
+            else
+            {
+                session.output().write(quoteName(fl::i18n::utf8_to_ustring(name)) + '\n');
+            }
         }
         session.output().flush();
-        remark(std::to_string(branches.size()) + (branches.size() == 1 ? " branch" : " branches"));
+        remark(sayCount(branches.size(), "%1% branch", "%1% branches"));
         return Done;
     }
 

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include <filesystem>
 #include <string>
+#include <string_view>
 #include <system_error>
 
 #include <CLI/CLI.hpp>
@@ -9,9 +10,11 @@
 #include "Session.hpp"
 #include "arguments.hpp"
 #include "commands.hpp"
+#include "failures.hpp"
 #include "fl/i18n/convert.hpp"
 #include "names.hpp"
 #include "runWithRemote.hpp"
+#include "texts.hpp"
 
 namespace vclink::shell
 {
@@ -27,41 +30,63 @@ ustring readSpecifier(const std::string &argument)
     return fl::i18n::utf8_to_ustring(error ? argument : local.string());
 }
 
+/// The last part of an address, without ".git", as git names the folder.
+/// @throws ShellFailure if there is none
+std::string nameFor(std::string specifier)
+{
+    const auto takeOff = [&specifier](std::string_view end)
+    {
+        const bool ends = specifier.size() > end.size() &&
+                          specifier.compare(specifier.size() - end.size(), end.size(), end) == 0;
+        specifier.erase(ends ? specifier.size() - end.size() : specifier.size());
+        return ends;
+    };
+    while (takeOff("/"))
+    {
+    }
+    takeOff("/.git") || takeOff(".git");
+    const std::string name = specifier.substr(specifier.find_last_of("/:") + 1);
+    if (name.empty() || name == "." || name == "..")
+    {
+        throw ShellFailure(say("Nothing was cloned: name a folder for the working copy."));
+    }
+    return name;
+}
+
 class CloneCommand : public Command
 {
   public:
     void declare(CLI::App &line) override
     {
         specifier_ = declareName(line, "SPECIFIER",
-                                 "The repository: a path, or an address such as "
-                                 "https://HOST/PATH,\nssh://NAME@HOST/PATH or NAME@HOST:PATH")
+                                 say("The repository: a path, or an address such as "
+                                     "https://HOST/PATH,\nssh://NAME@HOST/PATH or NAME@HOST:PATH"))
                          ->required();
-        folder_ =
-            declareName(line, "FOLDER", "The working copy to be made: new, or an empty folder")
-                ->required();
-        line.footer(
-            "Copies a repository with its history, and puts the files of its current branch on the "
-            "disk. It is\nthe remote \"origin\" of the working copy. Paths are read from the "
-            "current folder, after -C.\n\n"
-            "Nobody is asked anything: keys are taken from an ssh agent, and passwords are never "
-            "given. Every\ncertificate and host key is accepted.\n\n"
-            "Ctrl-C stops it while it is sent, and before the first file is written; what was made "
-            "is removed. A\nserver that is silent is waited for: when Ctrl-C has not helped for "
-            "three seconds, two more end the\nprogram, and may leave an unfinished folder.");
+        folder_ = declareName(line, "FOLDER",
+                              say("The working copy to be made: new, or an empty folder; without "
+                                  "it,\nnamed like the repository"));
+        line.footer(say("Copies a repository with its history, and writes the files of its current "
+                        "branch. It becomes the\nremote \"origin\" of the working copy.\n\n"
+                        "Never prompts: keys come from an ssh agent, and passwords are never sent. "
+                        "Every certificate and\nhost key is accepted."));
     }
 
     ExitStatus run(Session &session) override
     {
-        const std::filesystem::path folder = resolveArgument(folder_->results().front());
-        const ustring specifier = readSpecifier(specifier_->results().front());
+        const std::string &argument = specifier_->results().front();
+        const std::filesystem::path folder =
+            resolveArgument(folder_->empty() ? nameFor(argument) : folder_->results().front());
+        const ustring specifier = readSpecifier(argument);
         const auto generator = session.factory().createWorkingCopyGenerator(session.interactor());
-        remark("Cloning into " + folder.string() + ':');
+        const std::string text = say("Cloning into %1%:", quoteName(makePath(folder).string()));
+        remark(text);
         RemoteNotes notes;
-        const ExitStatus status = runStoppableWithRemote(
-            session, notes, [&] { generator->generate(specifier, makePath(folder)); });
+        const ExitStatus status =
+            runStoppableWithRemote(session, Stops::BeforeWriting, text, notes,
+                                   [&] { generator->generate(specifier, makePath(folder)); });
         if (status == Done)
         {
-            remark("Done.");
+            remark(say("Done."));
         }
         return status;
     }

@@ -1,77 +1,21 @@
 // SPDX-License-Identifier: MIT
 #include "CommandLine.hpp"
 
-#include <algorithm>
-#include <string_view>
-
 #include "Output.hpp"
+#include "arguments.hpp"
+#include "commands.hpp"
 #include "failures.hpp"
+#include "lineArguments.hpp"
 #include "severities.hpp"
+#include "suggestions.hpp"
+#include "texts.hpp"
 
 namespace vclink::shell
 {
 namespace
 {
 
-// CLI11 takes the brackets off an argument and splits it at its commas, takes "++" for the end of a
-// command's arguments, and reads nothing after "--" once it has seen the first of a list of paths.
-// Such arguments are hidden from it behind a NUL, which no argument can hold, until they have found
-// their option.
-constexpr char hidingMark = '\0';
-
-// Whatever follows it is its value.
-constexpr const char *freeTextOption = "-m";
-
-bool isMisread(std::string_view argument)
-{
-    return argument.substr(0, 1) == "[" || argument == "++";
-}
-
-/// The arguments in reverse order, as CLI11 reads them.
-std::vector<std::string> readArguments(int argc, const char *const *argv)
-{
-    std::vector<std::string> arguments;
-    bool optionsHaveEnded = false;
-    for (int index = 1; index < argc; ++index)
-    {
-        const std::string argument = argv[index];
-        if (!optionsHaveEnded && argument == freeTextOption && index + 1 < argc)
-        {
-            arguments.push_back(argument);
-            arguments.push_back(hidingMark + std::string(argv[++index]));
-            continue;
-        }
-        if (!optionsHaveEnded && argument == "--")
-        {
-            optionsHaveEnded = true;
-            continue;
-        }
-        const bool isHidden = optionsHaveEnded || isMisread(argument);
-        arguments.push_back(isHidden ? hidingMark + argument : argument);
-    }
-    std::reverse(arguments.begin(), arguments.end());
-    return arguments;
-}
-
-std::string showHidden(std::string text)
-{
-    text.erase(std::remove(text.begin(), text.end(), hidingMark), text.end());
-    return text;
-}
-
-void showHiddenValues(CLI::App &line)
-{
-    for (CLI::Option *option : line.get_options())
-    {
-        option->transform(CLI::Validator(
-            [](std::string &value)
-            {
-                value = showHidden(std::move(value));
-                return std::string();
-            },
-            ""));
-    }
-}
+constexpr const char *program = "vclink-shell";
 
 std::optional<Progress> parseProgress(const std::string &text)
 {
@@ -86,45 +30,66 @@ std::optional<Progress> parseProgress(const std::string &text)
     return text == "never" ? std::optional(Progress::Never) : std::nullopt;
 }
 
-/// What is wrong with a line that has something too much.
-std::string describeExtras(const CLI::App &line)
+/// An option as it is typed: "-m MESSAGE", or "PATH" for one that is known by its place.
+std::string labelOf(const CLI::Option &option)
 {
-    const std::string first = '"' + showHidden(line.remaining(true).front()) + '"';
-    return line.get_subcommands().empty() ? "There is no command or option " + first + "."
-                                          : first + " was not expected.";
+    const std::string name = option.get_name();
+    return option.get_positional() ? name : name + ' ' + option.get_type_name();
 }
 
-ExitStatus refuse(const std::string &reason)
+std::vector<std::string> optionsOf(const CLI::App &line)
 {
-    complain(reason + " --help tells how it is used.");
-    return WrongUsage;
+    std::vector<std::string> names;
+    for (const CLI::Option *option : line.get_options())
+    {
+        for (const std::string &name : option->get_lnames())
+        {
+            names.push_back("--" + name);
+        }
+    }
+    return names;
 }
 
-void setWords(CLI::FormatterBase &help)
+void setWords(CLI::App &line)
 {
-    help.label("OPTIONS", "OPTION...");
-    help.label("SUBCOMMAND", "COMMAND ...");
-    help.label("Positionals", "Arguments");
-    help.label("REQUIRED", "");
-    help.column_width(24);
+    const std::shared_ptr<CLI::FormatterBase> help = line.get_formatter();
+    help->label("Usage", say("Usage"));
+    help->label("OPTIONS", say("OPTION..."));
+    help->label("SUBCOMMAND", say("COMMAND ..."));
+    help->label("Positionals", say("Arguments"));
+    help->label("REQUIRED", "");
+    help->column_width(24);
+}
+
+void setGroup(CLI::App &line)
+{
+    for (CLI::Option *option : line.get_options())
+    {
+        if (!option->get_positional())
+        {
+            option->group(say("Options"));
+        }
+    }
 }
 
 } // namespace
 
 CommandLine::CommandLine()
-    : line_(std::make_unique<CLI::App>("Shows and changes a Git working copy, as a desktop host "
-                                       "does it through the vclink_git library.",
-                                       "vclink-shell"))
+    : line_(std::make_unique<CLI::App>(say("Shows and changes a Git working copy, as a desktop "
+                                           "host does it through the vclink_git library."),
+                                       program))
 {
-    setWords(*line_->get_formatter());
-    line_->set_help_flag("-h,--help", "Show this help");
-    line_->footer(
-        "vclink-shell COMMAND --help tells more of a command.\n\n"
-        "Exit status: 0 done, 1 failed, 2 wrong usage, 128 and a signal's number stopped.");
+    setWords(*line_);
+    line_->set_help_flag("-h,--help", say("Show this help"));
+    line_->set_version_flag("--version", versionText, say("Show the versions, as version does"));
+    line_->footer(say("\"vclink-shell help COMMAND\" tells more about a command.\n\n"
+                      "Exit status: 0 done, 1 failed, 2 wrong usage, 128 and a signal's number "
+                      "stopped."));
     // A file may have the name of a command: only the first word is one.
     line_->require_subcommand(0, 1);
     declareSettings();
     showHiddenValues(*line_);
+    setGroup(*line_);
     declareCommands();
 }
 
@@ -135,7 +100,7 @@ void CommandLine::declareSettings()
     line_
         ->add_option_function<std::vector<std::string>>(
             "-C", [this](const std::vector<std::string> &folders) { settings_.folders = folders; },
-            "Work as if started in FOLDER")
+            say("Work as if started in FOLDER"))
         ->type_name("FOLDER")
         ->option_text("FOLDER")
         ->allow_extra_args(false);
@@ -148,18 +113,19 @@ void CommandLine::declareSettings()
                 if (!settings_.severities)
                 {
                     throw CLI::ValidationError(
-                        "--log",
-                        "\"" + text +
-                            "\" is neither a number nor a list of these names: " + severityNames());
+                        "--log", say("\"%1%\" is neither a number nor a list of these names: %2%",
+                                     text, severityNames()));
                 }
             },
-            "Show the library's log on standard error: a number, or\nnames separated by commas: " +
-                severityNames())
+            say("Show the library's log on standard error: a number, or\nnames separated by "
+                "commas: %1%",
+                severityNames()))
         ->type_name("SEVERITIES");
+    // Read before the line is, see findLocale().
     line_
         ->add_option_function<std::string>(
-            "--lang", [this](const std::string &locale) { settings_.locale = locale; },
-            "Give error messages in the language of this locale, e.g. de")
+            "--lang", [](const std::string & /*locale*/) {},
+            say("Use the language of this locale: en, de or ja"))
         ->type_name("LOCALE");
     line_
         ->add_option_function<std::string>(
@@ -170,30 +136,39 @@ void CommandLine::declareSettings()
                 if (!progress)
                 {
                     throw CLI::ValidationError("--progress",
-                                               "\"" + text + "\" is not auto, always or never");
+                                               say("\"%1%\" is not auto, always or never", text));
                 }
                 settings_.progress = *progress;
             },
-            "Draw the progress of long operations on standard error: always,\nnever, or auto "
-            "(if that is a terminal)")
+            say("Draw the progress of long operations on standard error: always,\nnever, or auto "
+                "(if that is a terminal)"))
         ->type_name("WHEN");
-    line_->add_flag(
-        "--bare", settings_.takesAnyBare,
-        "Also work in a bare repository inside a working copy, whose\nconfiguration may "
-        "have come with a clone");
+    line_->add_flag("--bare", settings_.takesAnyBare,
+                    say("Also work in a bare repository inside a working copy, whose\n"
+                        "configuration may have come with a clone"));
 }
 
 void CommandLine::declareCommands()
 {
+    const auto add = [this](const char *name, const std::string &summary)
+    {
+        CLI::App *line = line_->add_subcommand(name, summary);
+        line->set_help_flag("-h,--help", say("Show this help"));
+        line->group(say("Commands"));
+        return line;
+    };
     for (const CommandEntry &entry : commandTable())
     {
-        CLI::App *line = line_->add_subcommand(entry.name, entry.summary);
+        CLI::App *line = add(entry.name, say(entry.summary));
         std::unique_ptr<Command> command = entry.make();
-        line->group("Commands");
         command->declare(*line);
         showHiddenValues(*line);
+        setGroup(*line);
         commands_.emplace_back(line, std::move(command));
     }
+    help_ = add("help", say("Show the help of a command"));
+    declareName(*help_, "COMMAND", say("The command; without it, all commands"));
+    setGroup(*help_);
 }
 
 std::optional<ExitStatus> CommandLine::parse(int argc, const char *const *argv, Output &output)
@@ -204,19 +179,23 @@ std::optional<ExitStatus> CommandLine::parse(int argc, const char *const *argv, 
     }
     catch (const CLI::CallForHelp &)
     {
-        // For the line of usage: a command is not optional.
-        line_->require_subcommand(1);
-        output.write(line_->help());
+        const CLI::App *const line = parsedCommand();
+        return help(line == nullptr ? "" : line->get_name(), output);
+    }
+    catch (const CLI::CallForVersion &)
+    {
+        output.write(versionText());
         output.flush();
         return Done;
     }
-    catch (const CLI::ExtrasError &)
-    {
-        return refuse(describeExtras(*line_));
-    }
     catch (const CLI::ParseError &error)
     {
-        return refuse(std::string(error.what()) + ".");
+        return refuse(describe(error));
+    }
+    if (help_->parsed())
+    {
+        const std::vector<std::string> names = help_->get_option("COMMAND")->results();
+        return help(names.empty() ? "" : names.front(), output);
     }
     for (const auto &[line, command] : commands_)
     {
@@ -226,7 +205,99 @@ std::optional<ExitStatus> CommandLine::parse(int argc, const char *const *argv, 
             return std::nullopt;
         }
     }
-    return refuse("A command is missing.");
+    return refuse(say("A command is missing."));
+}
+
+std::optional<ExitStatus> CommandLine::help(const std::string &command, Output &output) const
+{
+    std::string text;
+    if (command.empty())
+    {
+        // For the line of usage: a command is not optional.
+        line_->require_subcommand(1);
+        text = line_->get_formatter()->make_help(line_.get(), program, CLI::AppFormatMode::Normal);
+    }
+    for (const CLI::App *line : line_->get_subcommands({}))
+    {
+        if (line->get_name() == command)
+        {
+            text = line->help(program);
+        }
+    }
+    if (text.empty())
+    {
+        return refuse(say("Unknown command '%1%'.", command) + suggestCommand(command));
+    }
+    output.write(text);
+    output.flush();
+    return Done;
+}
+
+const CLI::App *CommandLine::parsedCommand() const
+{
+    const std::vector<CLI::App *> parsed = line_->get_subcommands();
+    return parsed.empty() ? nullptr : parsed.front();
+}
+
+std::string CommandLine::describe(const CLI::ParseError &error) const
+{
+    // What is not known comes first: it may be why something else is missing.
+    const std::string extra = describeExtra();
+    if (!extra.empty())
+    {
+        return extra;
+    }
+    const std::string text = error.what();
+    const std::string name = text.substr(0, text.find(':'));
+    if (dynamic_cast<const CLI::RequiredError *>(&error) != nullptr)
+    {
+        return describeMissing(text.substr(0, text.find(" is required")));
+    }
+    if (dynamic_cast<const CLI::ArgumentMismatch *>(&error) != nullptr)
+    {
+        return text.find("At Most") == std::string::npos ? say("%1% needs a value.", name)
+                                                         : say("%1% can be given only once.", name);
+    }
+    return text + '.';
+}
+
+std::string CommandLine::describeExtra() const
+{
+    const std::vector<std::string> extras = line_->remaining(true);
+    if (extras.empty())
+    {
+        return {};
+    }
+    const CLI::App *const command = parsedCommand();
+    const std::string &first = extras.front();
+    if (first.size() > 1 && first.front() == '-')
+    {
+        const std::string instead =
+            command == nullptr ? "" : suggestInstead(command->get_name(), first);
+        return say("Unknown option '%1%'.", first) +
+               (instead.empty() ? suggest(first, optionsOf(command == nullptr ? *line_ : *command))
+                                : instead);
+    }
+    const std::string word = showHidden(first);
+    return command == nullptr ? say("Unknown command '%1%'.", word) + suggestCommand(word)
+                              : say("Unexpected argument '%1%'.", word);
+}
+
+std::string CommandLine::describeMissing(const std::string &name) const
+{
+    const CLI::App *const command = parsedCommand();
+    const CLI::Option *const option =
+        (command == nullptr ? line_.get() : command)->get_option_no_throw(name);
+    return say("%1% is missing.", option == nullptr ? name : labelOf(*option));
+}
+
+ExitStatus CommandLine::refuse(const std::string &reason) const
+{
+    const CLI::App *const command = parsedCommand();
+    const std::string page =
+        std::string(program) + " help" + (command == nullptr ? "" : ' ' + command->get_name());
+    complain(reason + '\n' + say("See \"%1%\".", page));
+    return WrongUsage;
 }
 
 const Settings &CommandLine::settings() const noexcept

@@ -29,7 +29,6 @@ struct Settings
     /// folders to start in, one after the other
     std::vector<std::string> folders;
     std::optional<unsigned> severities;
-    std::optional<std::string> locale;
     Progress progress = Progress::WhereSeen;
     /// whether to work in a bare repository inside a working copy, too
     bool takesAnyBare = false;
@@ -57,10 +56,18 @@ class CommandLine
   private:
     void declareSettings();
     void declareCommands();
+    std::optional<ExitStatus> help(const std::string &command, Output &output) const;
+    /// The command that the line names, whatever is wrong with its arguments.
+    const CLI::App *parsedCommand() const;
+    std::string describe(const CLI::ParseError &error) const;
+    std::string describeExtra() const;
+    std::string describeMissing(const std::string &name) const;
+    ExitStatus refuse(const std::string &reason) const;
 
     std::unique_ptr<CLI::App> line_;
     Settings settings_;
     std::vector<std::pair<CLI::App *, std::unique_ptr<Command>>> commands_;
+    CLI::App *help_ = nullptr;
     Command *chosen_ = nullptr;
 };
 

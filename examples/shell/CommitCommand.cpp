@@ -9,10 +9,12 @@
 #include "commands.hpp"
 #include "failures.hpp"
 #include "fl/i18n/convert.hpp"
+#include "mergeLeftovers.hpp"
 #include "namedPaths.hpp"
 #include "refusals.hpp"
 #include "runStoppable.hpp"
 #include "states.hpp"
+#include "texts.hpp"
 #include "unfinished.hpp"
 #include "workingCopy.hpp"
 
@@ -22,18 +24,39 @@ namespace
 {
 
 /// @throws ShellFailure when there are any
-void refuseConflicts(const FileStateMap &states, const upath &root)
+void refuseConflicts(const FileStateMap &states)
 {
     const FileStateMap conflicts = filter(states, isInConflict);
     if (!conflicts.empty())
     {
-        throw ShellFailure(
-            "Nothing was committed, because these files are in conflict:" +
-            listNames(conflicts, root) +
-            "\nMake each as it should be, and mark it with \"vclink-shell resolved\". "
-            "With --as-is the commit\ntakes them as they stand, with any conflict "
-            "markers.");
+        throw ShellFailure(say(
+            "Nothing was committed, because these files are in conflict:%1%\nEdit each until it "
+            "is right, and mark it with \"vclink-shell resolved\". With --as-is the commit\n"
+            "takes them as they are, with any conflict markers.",
+            listNames(conflicts)));
     }
+}
+
+bool isBlank(const std::string &text)
+{
+    return text.find_first_not_of(" \t\r\n\v\f") == std::string::npos;
+}
+
+/// @throws ShellFailure if the commit would change nothing
+void refuseEmpty(CMAdapter &adapter, const FileStateMap &states)
+{
+    if (!filter(states, isChanged).empty() || isMergeUnderWay(adapter))
+    {
+        return;
+    }
+    const std::size_t untracked =
+        filter(states, [](FileState::State state) { return !isTracked(state); }).size();
+    const std::string nothing = say("Nothing was committed: no tracked file has changed.");
+    throw ShellFailure(untracked == 0 ? nothing
+                                      : nothing + '\n' +
+                                            say("Untracked: %1%. Add what is to be committed with "
+                                                "\"vclink-shell add\".",
+                                                countFiles(untracked)));
 }
 
 class CommitCommand : public Command
@@ -41,21 +64,25 @@ class CommitCommand : public Command
   public:
     void declare(CLI::App &line) override
     {
-        message_ = line.add_option_function<std::string>(
-                           "-m", [](const std::string & /*message*/) {},
-                           "What the commit says, as it stands")
-                       ->type_name("MESSAGE")
-                       ->option_text("MESSAGE")
-                       ->required();
-        line.add_flag("--as-is", takesAll_,
-                      "Commit files in conflict as they stand, markers included, and in the midst\n"
-                      "of a rebase, a bisection or a series of picked commits, which ends it");
-        line.footer("All changes to tracked files are in the commit, staged or not, and what was "
-                    "added or removed.\n"
-                    "A merge that is under way is ended by it. The identity is that of git's "
-                    "settings user.name and\n"
-                    "user.email; where they are not set, it is made from USER or LOGNAME and the "
-                    "name of the host.");
+        message_ =
+            line.add_option_function<std::string>(
+                    "-m", [](const std::string & /*message*/) {}, say("What the commit says"))
+                ->type_name("MESSAGE")
+                ->option_text("MESSAGE")
+                ->required();
+        line.add_flag_callback(
+            "-a,--all", [] {}, say("Changes nothing: a commit takes all changes anyway"));
+        line.add_flag("--allow-empty", mayBeEmpty_, say("Commit even if nothing has changed"));
+        line.add_flag("--allow-empty-message", mayBeSilent_, say("Commit with an empty message"));
+        line.add_flag(
+            "--as-is", takesAll_,
+            say("Commit files in conflict as they are, markers included, and in the midst\n"
+                "of a rebase, a bisection or a series of picked commits, which ends it"));
+        line.footer(
+            say("Commits all changes to tracked files, staged or not, and what was added or "
+                "removed. Concludes a\nmerge that is under way. The author comes from git's "
+                "settings user.name and user.email, or else\nfrom USER or LOGNAME and the "
+                "name of the host."));
     }
 
     ExitStatus run(Session &session) override
@@ -64,13 +91,24 @@ class CommitCommand : public Command
         const upath &root = adapter.getRootFolder();
         const FileStateMap states =
             takesAll_ ? adapter.getFolderStates(root) : wholeStates(adapter);
+        const std::string &message = message_->results().front();
+        if (isBlank(message) && !mayBeSilent_)
+        {
+            throw ShellFailure(say("Nothing was committed: the message is empty."));
+        }
         if (!takesAll_)
         {
             refuseHalfWay(adapter);
-            refuseConflicts(states, root);
+            refuseConflicts(states);
         }
-        const ustring message = fl::i18n::utf8_to_ustring(message_->results().front());
-        const ExitStatus status = runStoppable(session, [&] { adapter.commit(root, message); });
+        if (!mayBeEmpty_)
+        {
+            refuseEmpty(adapter, states);
+        }
+        tellSetAside(adapter);
+        const ExitStatus status =
+            runStoppable(session, Stops::Never,
+                         [&] { adapter.commit(root, fl::i18n::utf8_to_ustring(message)); });
         if (status != Done)
         {
             return status;
@@ -78,13 +116,15 @@ class CommitCommand : public Command
         // What a sparse checkout leaves out is missing before and after.
         const FileStateMap changed = filter(states, isChanged);
         const std::size_t left = findLeftOut(adapter, changed, isChanged).size();
-        remark(states.empty() ? "Committed."
-                              : "Committed " + countFiles(changed.size() - left) + '.');
+        remark(states.empty() ? say("Committed.")
+                              : say("Committed %1%.", countFiles(changed.size() - left)));
         return Done;
     }
 
   private:
     const CLI::Option *message_ = nullptr;
+    bool mayBeEmpty_ = false;
+    bool mayBeSilent_ = false;
     bool takesAll_ = false;
 };
 

@@ -11,6 +11,7 @@
 #include "fl/i18n/convert.hpp"
 #include "names.hpp"
 #include "runStoppable.hpp"
+#include "texts.hpp"
 #include "vclink/git/GitConfig.hpp"
 
 namespace vclink::shell
@@ -23,16 +24,11 @@ class ConfigCommand : public Command
   public:
     void declare(CLI::App &line) override
     {
-        line.add_flag("--write", writes_,
-                      "Install the tools that come along, in place of the values that are there");
-        line.footer("Shows the merge and diff tools in Git's configuration of this user. One line "
-                    "for each that is set:\n"
-                    "its key, a tab, and its value. A file is merged by the automatic tool when "
-                    "the attribute \"merge\"\n"
-                    "gives it \"vkAutoMerge\"; git mergetool and git difftool run the others when "
-                    "they are told\n"
-                    "\"--tool=vkMerge\" and \"--tool=vkDiff\". The file goes to standard error, if "
-                    "that is a terminal.");
+        line.add_flag(
+            "--write", writes_,
+            say("Install the tools that come along, in place of the values that are there"));
+        line.footer(say("Shows the merge and diff tools in Git's configuration of this user: one "
+                        "line for each that is set,\nits key, a tab, and its value."));
     }
 
     ExitStatus run(Session &session) override
@@ -42,14 +38,15 @@ class ConfigCommand : public Command
         {
             show(config, session.output());
         }
-        else if (const ExitStatus status = runStoppable(session, [&config] { write(config); });
+        else if (const ExitStatus status =
+                     runStoppable(session, Stops::Never, [&config] { write(config); });
                  status != Done)
         {
             return status;
         }
         const std::optional<upath> file = config.globalFilePath();
-        remark(file ? "Git's configuration of this user: " + nativePath(*file).string()
-                    : "There is no .gitconfig in the home folder.");
+        remark(file ? say("Git's configuration of this user: %1%", nativePath(*file).string())
+                    : say("There is no .gitconfig in the home folder."));
         return Done;
     }
 

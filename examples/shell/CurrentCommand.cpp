@@ -6,6 +6,7 @@
 #include "commands.hpp"
 #include "fl/i18n/convert.hpp"
 #include "names.hpp"
+#include "texts.hpp"
 #include "vclink/git/BranchManager.hpp"
 
 namespace vclink::shell
@@ -18,8 +19,8 @@ class CurrentCommand : public Command
   public:
     void declare(CLI::App &line) override
     {
-        line.footer("There is none before the first commit, nor while no branch but a commit is "
-                    "checked out.");
+        line.footer(say("There is none before the first commit, nor while a commit is checked "
+                        "out instead of a branch."));
     }
 
     ExitStatus run(Session &session) override

@@ -1,7 +1,6 @@
 // SPDX-License-Identifier: MIT
+#include <memory>
 #include <string>
-
-#include <CLI/CLI.hpp>
 
 #include "Output.hpp"
 #include "Session.hpp"
@@ -9,6 +8,7 @@
 #include "commands.hpp"
 #include "remotes.hpp"
 #include "runWithRemote.hpp"
+#include "texts.hpp"
 
 namespace vclink::shell
 {
@@ -22,39 +22,34 @@ class FetchCommand : public Command
     {
         remote_ = declareRemote(line);
         refspecs_ = declareNames(line, "REFSPEC",
-                                 "What to fetch, and where to, e.g. "
-                                 "refs/heads/a:refs/remotes/origin/a;\nwithout any, what the "
-                                 "remote's configuration says");
-        line.footer(
-            "Brings the remote's branches and their tags up to date here, e.g. origin/main. The "
-            "working copy\nstays as it is: see merge for the next step. A branch that is gone at "
-            "the remote stays here. What\nis not found there is passed over.\n\n"
-            "Nobody is asked anything, see clone. Ctrl-C stops it while it is sent, and the "
-            "branches stay as they\nwere; where the server is silent, as with clone.");
+                                 say("What to fetch, and where to, e.g. "
+                                     "refs/heads/a:refs/remotes/origin/a;\nwithout any, what the "
+                                     "remote's configuration says"));
+        line.footer(say("Updates the remote's branches and their tags here, e.g. origin/main. The "
+                        "working copy stays as it\nis: see merge for the next step. A branch that "
+                        "was deleted at the remote stays here.\n\n"
+                        "Never prompts (see clone)."));
     }
 
     ExitStatus run(Session &session) override
     {
-        const std::string name = remote_->results().front();
-        const auto remote = openRemote(session, *remote_);
+        const std::string name = chooseRemote(session, *remote_, Direction::Here);
+        const auto remote = openRemote(session, name);
         RemoteNotes notes;
         const ExitStatus status = runStoppableWithRemote(
-            session, notes, [&] { remote->fetch(readRefspecs(*refspecs_)); });
+            session, Stops::BeforeWriting, say("Fetching from %1%:", name), notes,
+            [&] { remote->fetch(readRefspecs(refspecs_->results())); });
         if (status == Done)
         {
-            remark(notes.updated == 0 ? "There was nothing new at " + name + '.'
-                                      : "Fetched from " + name + ": " + count(notes.updated) + '.');
+            remark(notes.updated == 0 ? say("There was nothing new at %1%.", name)
+                                      : say("Fetched from %1%: %2%.", name,
+                                            sayCount(notes.updated, "%1% reference changed",
+                                                     "%1% references changed")));
         }
         return status;
     }
 
   private:
-    static std::string count(unsigned references)
-    {
-        return std::to_string(references) +
-               (references == 1 ? " reference changed" : " references changed");
-    }
-
     const CLI::Option *remote_ = nullptr;
     const CLI::Option *refspecs_ = nullptr;
 };

@@ -11,6 +11,7 @@
 #include "names.hpp"
 #include "remotes.hpp"
 #include "runWithRemote.hpp"
+#include "texts.hpp"
 
 namespace vclink::shell
 {
@@ -35,21 +36,21 @@ class HeadsCommand : public Command
     void declare(CLI::App &line) override
     {
         remote_ = declareRemote(line);
-        line.add_flag("-z", endWithNul_, "End each line with NUL, and write names byte for byte");
-        line.footer(
-            "One line for each reference that the remote shows: the id, a tab, and the full name; "
-            "for a\nsymbolic one, such as HEAD, another tab and the name that it stands for. A "
-            "name with \"^{}\" at its\nend gives the object that a tag leads to. Nobody is asked "
-            "anything, see clone.");
+        line.add_flag("-z", endWithNul_,
+                      say("End each line with NUL, and write names byte for byte"));
+        line.footer(say("One line for each reference of the remote: the id, a tab, and the full "
+                        "name; for a symbolic one,\nsuch as HEAD, another tab and the name that it "
+                        "means. A name that ends in \"^{}\" is the object\nthat a tag leads to.\n\n"
+                        "Never prompts (see clone)."));
     }
 
     ExitStatus run(Session &session) override
     {
-        const std::string name = remote_->results().front();
-        const auto remote = openRemote(session, *remote_);
+        const std::string name = chooseRemote(session, *remote_, Direction::Here);
+        const auto remote = openRemote(session, name);
         RemoteNotes notes;
         std::vector<git::GitRemoteHead> heads;
-        const ExitStatus status = runWithRemote(session, notes,
+        const ExitStatus status = runWithRemote(session, say("Asking %1%:", name), notes,
                                                 [&]
                                                 {
                                                     heads = remote->getRemoteHeads();
@@ -64,7 +65,7 @@ class HeadsCommand : public Command
             writeRecord(session.output(), head);
         }
         session.output().flush();
-        remark(std::to_string(heads.size()) + (heads.size() == 1 ? " reference" : " references"));
+        remark(sayCount(heads.size(), "%1% reference", "%1% references"));
         return Done;
     }
 
@@ -76,7 +77,14 @@ class HeadsCommand : public Command
         {
             record += '\t' + show(head.symrefTarget);
         }
-        output.write(record + (endWithNul_ ? '\0' : '\n'));
+        if (endWithNul_)
+        {
+            output.writeRaw(record + '\0');
+        }
+        else
+        {
+            output.write(record + '\n');
+        }
     }
 
     std::string show(const std::string &name) const

@@ -8,6 +8,7 @@
 
 #include <unistd.h>
 
+#include "texts.hpp"
 #include "vclink_host/cancellation.hpp"
 
 namespace vclink::shell
@@ -58,8 +59,10 @@ class HeldBack
 } // namespace
 
 InterruptWatch::InterruptWatch(Terminator &terminator, Activity &activity,
-                               std::function<void(const std::string &)> tellGivenUp)
-    : terminator_(terminator), activity_(activity), tellGivenUp_(std::move(tellGivenUp))
+                               std::function<void(const std::string &)> tellGivenUp,
+                               std::function<void()> tellAsked)
+    : terminator_(terminator), activity_(activity), tellGivenUp_(std::move(tellGivenUp)),
+      tellAsked_(std::move(tellAsked))
 {
     for (std::size_t index = 0; index < signals.size(); ++index)
     {
@@ -148,11 +151,12 @@ void InterruptWatch::answer(int signal)
         // The three seconds begin here at the earliest.
         activity_.note();
         ask();
+        tellAsked_();
         return;
     }
     if (activity_.quiet() >= patience)
     {
-        giveUp("Nothing was heard of the operation for a while.");
+        giveUp(say("Nothing was heard of the operation for a while."));
     }
 }
 
@@ -164,7 +168,7 @@ void InterruptWatch::ask()
     }
     catch (const std::exception &failure)
     {
-        giveUp(std::string("The operation can't be asked to stop: ") + failure.what() + '.');
+        giveUp(say("The operation can't be asked to stop: %1%.", failure.what()));
     }
 }
 

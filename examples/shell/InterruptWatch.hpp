@@ -28,11 +28,15 @@ class InterruptWatch
   public:
     /// @param terminator, activity outlive the watch
     /// @param tellGivenUp called on the watch's own thread when the defaults were restored, with
-    /// the
-    ///        reason, which is a sentence; it must not throw
+    ///        the reason, which is a sentence; it must not throw
+    /// @param tellAsked called on the watch's own thread when the first signal has come; it must
+    /// not
+    ///        throw
     /// @throws std::system_error when the pipe or the thread can't be had
-    InterruptWatch(Terminator &terminator, Activity &activity,
-                   std::function<void(const std::string &)> tellGivenUp);
+    InterruptWatch(
+        Terminator &terminator, Activity &activity,
+        std::function<void(const std::string &)> tellGivenUp,
+        std::function<void()> tellAsked = [] {});
     InterruptWatch(const InterruptWatch &) = delete;
     InterruptWatch &operator=(const InterruptWatch &) = delete;
     /// As end().
@@ -58,6 +62,7 @@ class InterruptWatch
     Terminator &terminator_;
     Activity &activity_;
     std::function<void(const std::string &)> tellGivenUp_;
+    std::function<void()> tellAsked_;
     std::atomic<int> askedBy_{0};
     Pipe pipe_;
     std::array<struct sigaction, signals.size()> previous_{};

@@ -13,6 +13,7 @@
 #include <boost/log/sinks/text_ostream_backend.hpp>
 #include <boost/make_shared.hpp>
 
+#include "Output.hpp"
 #include "ProgressLine.hpp"
 #include "fl/i18n/convert.hpp"
 #include "libraryRecords.hpp"
@@ -34,6 +35,7 @@ void formatRecord(const boost::log::record_view &record, boost::log::formatting_
     std::string text =
         message ? makePrintable(fl::i18n::utf8_to_ustring(message.get())) : std::string();
     boost::algorithm::replace_all(text, "\n", "\n    ");
+    text = errorsAreOnTerminal() ? escapeDirections(text) : text;
     stream << '[' << severityName(severity) << "] " << text;
 }
 

@@ -43,6 +43,8 @@ void takeNote(MergeNotes &notes, const std::string &record)
     if (!driver.empty())
     {
         notes.driver = driver;
+        notes.command =
+            record.substr(record.find(".driver ") + std::string_view(".driver ").size());
     }
     else if (record == "Auto-merge unsuccessful")
     {

@@ -15,8 +15,9 @@ struct MergeNotes
 {
     /// libgit2's code of the last failure; 0 if there was none
     int failure = 0;
-    /// the driver whose command ran last
+    /// the driver whose command ran last, and the command
     std::string driver;
+    std::string command;
     /// how many files the command of each driver has refused
     std::map<std::string, std::size_t> refusals;
 };

@@ -14,6 +14,7 @@
 #include "failures.hpp"
 #include "fl/i18n/convert.hpp"
 #include "names.hpp"
+#include "texts.hpp"
 
 namespace vclink::shell
 {
@@ -56,16 +57,29 @@ bool isBrokenPipeAnError()
         throw OutputClosed();
     }
     throw ShellFailure(
-        "Standard output can't be written: " + std::generic_category().message(error) + ".");
+        say("Standard output can't be written: %1%.", std::generic_category().message(error)));
 }
 
 } // namespace
 
-Output::Output() : hasColour_(::isatty(STDOUT_FILENO) == 1 && personWantsColour())
+Output::Output()
+    : isTerminal_(::isatty(STDOUT_FILENO) == 1), hasColour_(isTerminal_ && personWantsColour())
 {
 }
 
 void Output::write(std::string_view text)
+{
+    if (isTerminal_)
+    {
+        writeRaw(escapeDirections(std::string(text)));
+    }
+    else
+    {
+        writeRaw(text);
+    }
+}
+
+void Output::writeRaw(std::string_view text)
 {
     text_ += text;
     if (text_.size() >= pieceSize)
@@ -110,7 +124,7 @@ void remark(const std::string &text)
 {
     if (errorsAreOnTerminal())
     {
-        std::cerr << makePrintable(fl::i18n::utf8_to_ustring(text)) + '\n';
+        std::cerr << escapeDirections(makePrintable(fl::i18n::utf8_to_ustring(text))) + '\n';
     }
 }
 

@@ -16,8 +16,11 @@ class Output
     Output &operator=(const Output &) = delete;
     ~Output() = default;
 
+    /// On a terminal, characters that change the direction of writing are escaped.
     /// @throws OutputClosed, ShellFailure when standard output can't be written
     void write(std::string_view text);
+    /// As write(), byte for byte.
+    void writeRaw(std::string_view text);
     /// @throws OutputClosed, ShellFailure when standard output can't be written; nothing is left to
     /// flush then
     void flush();
@@ -27,6 +30,7 @@ class Output
 
   private:
     std::string text_;
+    bool isTerminal_;
     bool hasColour_;
 };
 

@@ -6,6 +6,7 @@
 #include "commands.hpp"
 #include "fl/i18n/convert.hpp"
 #include "names.hpp"
+#include "texts.hpp"
 
 namespace vclink::shell
 {
@@ -17,10 +18,11 @@ class ProbeCommand : public Command
   public:
     void declare(CLI::App &line) override
     {
-        line.add_option("FOLDER", folder_, "The folder to look at")->required()->type_name("");
-        line.footer("Prints \"yes\" or \"no\", and ends with status 0 or 1. The folder itself has "
-                    "to be the root of a\nworking copy, or a bare repository: for a folder inside "
-                    "one the answer is \"no\".");
+        line.add_option("FOLDER", folder_, say("The folder to look at"))->required()->type_name("");
+        line.footer(
+            say("Prints \"yes\" or \"no\", and ends with status 0 or 1. The answer is \"yes\" "
+                "for the root of a working\ncopy and for a bare repository, and \"no\" for "
+                "a folder inside one."));
     }
 
     ExitStatus run(Session &session) override
@@ -30,8 +32,8 @@ class ProbeCommand : public Command
         session.output().flush();
         if (served)
         {
-            remark("served by the back end \"" +
-                   fl::i18n::ustring_to_utf8(session.factory().getName()) + '"');
+            remark(say("served by the back end \"%1%\"",
+                       fl::i18n::ustring_to_utf8(session.factory().getName())));
         }
         return served ? Done : Failed;
     }

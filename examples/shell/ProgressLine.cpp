@@ -81,7 +81,7 @@ std::string composeProgress(double fraction, const ustring &message, std::size_t
     {
         text = percent.size() > columns ? std::string() : percent;
     }
-    const ustring line = fl::i18n::utf8_to_ustring(makePrintableLine(message));
+    const ustring line = fl::i18n::utf8_to_ustring(escapeDirections(makePrintableLine(message)));
     return text + fl::i18n::ustring_to_utf8(fit(line, columns - text.size()));
 }
 
@@ -96,20 +96,43 @@ ProgressLine::~ProgressLine()
 
 void ProgressLine::draw(double fraction, const ustring &message)
 {
-    if (!isShown_)
+    if (isShown_)
     {
-        return;
+        // In the last column some terminals begin a new line.
+        show(composeProgress(fraction, message, countColumns() - 1));
     }
+}
+
+void ProgressLine::drawText(const std::string &text)
+{
+    if (isShown_)
+    {
+        const std::string line = makePrintableLine(fl::i18n::utf8_to_ustring(text));
+        const ustring whole = fl::i18n::utf8_to_ustring(escapeDirections(line));
+        show(fl::i18n::ustring_to_utf8(fit(whole, countColumns() - 1)));
+    }
+}
+
+void ProgressLine::show(const std::string &text)
+{
     const std::lock_guard<std::mutex> lock(mutex_);
-    // In the last column some terminals begin a new line.
-    std::cerr << takeLineAway + composeProgress(fraction, message, countColumns() - 1)
-              << std::flush;
-    isDrawn_ = true;
+    if (!hasEnded_)
+    {
+        std::cerr << takeLineAway + text << std::flush;
+        isDrawn_ = true;
+    }
 }
 
 void ProgressLine::clear()
 {
     const std::lock_guard<std::mutex> lock(mutex_);
+    takeAway();
+}
+
+void ProgressLine::end()
+{
+    const std::lock_guard<std::mutex> lock(mutex_);
+    hasEnded_ = true;
     takeAway();
 }
 

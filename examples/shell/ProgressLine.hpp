@@ -29,19 +29,25 @@ class ProgressLine
     }
     /// @param fraction from 0 to 1
     void draw(double fraction, const ustring &message);
+    /// Draws a text without a bar.
+    void drawText(const std::string &text);
     /// Takes the line away, if there is one.
     void clear();
+    /// As clear(). Nothing is drawn any more.
+    void end();
     /// Takes the line away, if there is one, and writes something else there. Nothing is drawn
     /// until that is written.
     /// @param write must not use this line
     void clearFor(const std::function<void()> &write);
 
   private:
+    void show(const std::string &text);
     void takeAway();
 
     const bool isShown_;
     std::mutex mutex_;
     bool isDrawn_ = false;
+    bool hasEnded_ = false;
 };
 
 /// The line's text, which takes at most this many columns.

@@ -1,8 +1,11 @@
 // SPDX-License-Identifier: MIT
 #include "RemoteLog.hpp"
 
+#include <algorithm>
 #include <charconv>
+#include <iterator>
 #include <string_view>
+#include <utility>
 
 #include "severities.hpp"
 
@@ -40,6 +43,51 @@ void noteCredentials(RemoteNotes &notes, std::string_view request)
     notes.credentials = kinds;
 }
 
+/// What git's servers say of their progress.
+bool reportsProgress(std::string_view line)
+{
+    constexpr std::string_view beginnings[] = {
+        "Enumerating objects:", "Counting objects:",  "Compressing objects:", "Total ",
+        "Resolving deltas:",    "Unpacking objects:", "Checking connectivity"};
+    return std::any_of(std::begin(beginnings), std::end(beginnings),
+                       [line](std::string_view beginning)
+                       { return line.substr(0, beginning.size()) == beginning; });
+}
+
+void hearLine(RemoteNotes &notes, bool isDrawnAgain)
+{
+    std::string line = std::exchange(notes.unfinished, {});
+    line.erase(line.find_last_not_of(" \t") + 1);
+    const bool isProgress = isDrawnAgain || reportsProgress(line);
+    if (line.empty())
+    {
+        return;
+    }
+    if (!isProgress)
+    {
+        notes.words.push_back(line);
+    }
+    if (notes.hear)
+    {
+        notes.hear(line, isProgress);
+    }
+}
+
+void hearServer(RemoteNotes &notes, std::string_view text)
+{
+    for (const char letter : text)
+    {
+        if (letter == '\n' || letter == '\r')
+        {
+            hearLine(notes, letter == '\r');
+        }
+        else
+        {
+            notes.unfinished += letter;
+        }
+    }
+}
+
 } // namespace
 
 void takeNote(RemoteNotes &notes, const std::string &record)
@@ -58,11 +106,21 @@ void takeNote(RemoteNotes &notes, const std::string &record)
         const std::string_view status = splitAt(text, " statusStr=").value_or("");
         notes.pushed.push_back({std::string(text), std::string(status)});
     }
+    else if (takeFront(text, " msgStr="))
+    {
+        hearServer(notes, text);
+    }
 }
 
 RemoteLog::RemoteLog(RemoteNotes &notes)
-    : reader_(parameterSeverity, [&notes](const std::string &record) { takeNote(notes, record); })
+    : notes_(notes),
+      reader_(parameterSeverity, [&notes](const std::string &record) { takeNote(notes, record); })
 {
+}
+
+RemoteLog::~RemoteLog()
+{
+    hearLine(notes_, false);
 }
 
 } // namespace vclink::shell

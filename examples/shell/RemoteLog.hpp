@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include <functional>
 #include <optional>
 #include <string>
 #include <vector>
@@ -27,6 +28,12 @@ struct RemoteNotes
     /// how many references of the working copy changed
     unsigned updated = 0;
     std::vector<PushedReference> pushed;
+    /// what the server said in words, line by line, without reports of progress
+    std::vector<std::string> words;
+    /// called with each line that the server says, and whether it reports progress; may be empty
+    std::function<void(const std::string &line, bool isProgress)> hear;
+    /// the beginning of a line whose end has not come yet
+    std::string unfinished;
 };
 
 /// Takes the note that a record of the library's log is of, if it is of any.
@@ -40,8 +47,13 @@ class RemoteLog
   public:
     /// @param notes outlives the object
     explicit RemoteLog(RemoteNotes &notes);
+    RemoteLog(const RemoteLog &) = delete;
+    RemoteLog &operator=(const RemoteLog &) = delete;
+    /// Also notes a last line without an end.
+    ~RemoteLog();
 
   private:
+    RemoteNotes &notes_;
     RecordReader reader_;
 };
 

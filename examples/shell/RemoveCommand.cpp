@@ -14,6 +14,7 @@
 #include "refusals.hpp"
 #include "runStoppable.hpp"
 #include "states.hpp"
+#include "texts.hpp"
 
 namespace vclink::shell
 {
@@ -25,17 +26,10 @@ class RemoveCommand : public Command
   public:
     void declare(CLI::App &line) override
     {
-        paths_ = declarePaths(line, "Tracked files, and folders: all tracked files below them")
+        paths_ = declarePaths(line, say("Tracked files, and folders: all tracked files below them"))
                      ->required();
         line.footer(
-            "The files are gone in the next commit, and Git tracks them no longer. They stay on "
-            "the disk. A\n"
-            "name that no tracked file has is refused, and nothing is removed then. Files that are "
-            "removed\n"
-            "already are passed over; when there are no others, that is an error. Below a folder\n"
-            "files are removed too that a sparse checkout leaves out. A symbolic link that leads "
-            "somewhere can't\n"
-            "be removed: it would be followed.");
+            say("The files are gone in the next commit. They stay on the disk, untracked."));
     }
 
     ExitStatus run(Session &session) override
@@ -43,19 +37,20 @@ class RemoveCommand : public Command
         CMAdapter &adapter = session.adapter();
         const upath &root = adapter.getRootFolder();
         const std::vector<NamedPath> paths = lookUp(adapter, paths_->results());
-        refuseUnless("Nothing was removed", paths,
+        refuseUnless(say("Nothing was removed"), paths,
                      [&root](const NamedPath &named) { return explain(root, named); });
         const Cover removed = cover(root, paths, isRemovable, LinkNames::None);
-        refuseStrays("Nothing was removed", adapter, paths, removed.list, isRemovable);
-        const ExitStatus status = runStoppable(session, [&] { adapter.removeFiles(removed.list); });
+        refuseStrays(say("Nothing was removed"), adapter, paths, removed.list, isRemovable);
+        const ExitStatus status =
+            runStoppable(session, Stops::Never, [&] { adapter.removeFiles(removed.list); });
         if (status != Done)
         {
             return status;
         }
         const FileStateMap leftOut = findLeftOut(adapter, removed.files, isRemovable);
-        remark("Removed " + countFiles(removed.files.size() - leftOut.size()) +
-               " from Git, not from the disk.");
-        return tellLeftOut("Not all were removed", root, leftOut);
+        remark(say("Removed %1% from Git, not from the disk.",
+                   countFiles(removed.files.size() - leftOut.size())));
+        return tellLeftOut(say("Not all were removed"), root, leftOut);
     }
 
   private:
@@ -74,7 +69,7 @@ class RemoveCommand : public Command
         const FileStateMap meant = filter(named.states, isRemovable);
         const bool isUseless =
             named.isFolder && !meant.empty() && filterFollowed(meant, root, false).empty();
-        return isUseless ? "there are only symbolic links in it, which would be followed" : "";
+        return isUseless ? say("there are only symbolic links in it, which would be followed") : "";
     }
 
     const CLI::Option *paths_ = nullptr;

@@ -12,11 +12,13 @@
 #include "arguments.hpp"
 #include "commands.hpp"
 #include "links.hpp"
+#include "mergeLeftovers.hpp"
 #include "namedPaths.hpp"
 #include "names.hpp"
 #include "refusals.hpp"
 #include "runStoppable.hpp"
 #include "states.hpp"
+#include "texts.hpp"
 
 namespace vclink::shell
 {
@@ -28,29 +30,32 @@ class ResolvedCommand : public Command
   public:
     void declare(CLI::App &line) override
     {
-        path_ = declarePaths(line, "A file, or a folder: all files in conflict below it")
-                    ->required()
-                    ->expected(1);
-        line.footer("Takes the file as it now stands for the solution of its conflict; where it is "
-                    "gone from the\n"
-                    "disk, that is the solution. Its text is not looked at. A file that is in no "
-                    "conflict is staged\n"
-                    "as it stands. Symbolic links are refused.");
+        paths_ = declarePaths(line, say("Files, and folders: all files in conflict below them"))
+                     ->required();
+        line.footer(say("Takes a file as it is now for the solution of its conflict, or its "
+                        "absence if it is gone from the\ndisk. The text is not examined. A file "
+                        "that is not in conflict is staged as it is."));
     }
 
     ExitStatus run(Session &session) override
     {
         CMAdapter &adapter = session.adapter();
         const upath &root = adapter.getRootFolder();
-        const NamedPath named = lookUp(adapter, path_->results()).front();
-        const FileStateMap conflicts = filter(named.states, isInConflict);
-        const std::vector<upath> files =
-            named.isFolder ? solutions(conflicts, root) : std::vector<upath>{named.path};
-        refuseUnless("Nothing was marked as resolved", {named},
-                     [&](const NamedPath &path) { return explain(root, path, conflicts, files); });
-        refuseStrays("Nothing was marked as resolved", adapter, {named}, files,
+        const std::vector<NamedPath> paths = lookUp(adapter, paths_->results());
+        refuseUnless(say("Nothing was marked as resolved"), paths,
+                     [&](const NamedPath &named) { return explain(root, named); });
+        FileStateMap conflicts;
+        std::vector<upath> files;
+        for (const NamedPath &named : paths)
+        {
+            FileStateMap inConflict = filter(named.states, isInConflict);
+            const std::vector<upath> chosen = solutions(root, named, inConflict);
+            files.insert(files.end(), chosen.begin(), chosen.end());
+            conflicts.merge(inConflict);
+        }
+        refuseStrays(say("Nothing was marked as resolved"), adapter, paths, files,
                      [](FileState::State state) { return state != FileState::Clean; });
-        const ExitStatus status = runStoppable(session,
+        const ExitStatus status = runStoppable(session, Stops::Never,
                                                [&]
                                                {
                                                    for (const upath &file : files)
@@ -64,9 +69,10 @@ class ResolvedCommand : public Command
         }
         const FileStateMap leftOut = findLeftOut(adapter, conflicts, isInConflict);
         remark(conflicts.empty()
-                   ? "It was in no conflict, and is staged as it stands."
-                   : "Marked " + countFiles(conflicts.size() - leftOut.size()) + " as resolved.");
-        return tellLeftOut("Not all were marked as resolved", root, leftOut);
+                   ? say("It was not in conflict, and is staged as it is.")
+                   : say("Marked %1% as resolved.", countFiles(conflicts.size() - leftOut.size())));
+        tellSetAside(adapter);
+        return tellLeftOut(say("Not all were marked as resolved"), root, leftOut);
     }
 
   private:
@@ -77,15 +83,19 @@ class ResolvedCommand : public Command
     }
 
     /// The back end takes a link that leads nowhere for a file that is gone.
-    static std::vector<upath> solutions(const FileStateMap &conflicts, const upath &root)
+    static std::vector<upath> solutions(const upath &root, const NamedPath &named,
+                                        const FileStateMap &conflicts)
     {
+        if (!named.isFolder)
+        {
+            return {named.path};
+        }
         std::vector<upath> files = addressable(filterFollowed(conflicts, root, false), root);
         files.erase(std::remove_if(files.begin(), files.end(), isLink), files.end());
         return files;
     }
 
-    static std::string explain(const upath &root, const NamedPath &named,
-                               const FileStateMap &conflicts, const std::vector<upath> &files)
+    static std::string explain(const upath &root, const NamedPath &named)
     {
         if (named.states.empty())
         {
@@ -97,18 +107,22 @@ class ResolvedCommand : public Command
         }
         if (isLink(named.path))
         {
-            return "it is a symbolic link that leads nowhere, and would be removed: use \"git "
-                   "add\"";
+            return say(
+                "it is a symbolic link that leads nowhere, and would be removed: use \"%1%\"",
+                "git add");
         }
+        const FileStateMap conflicts = filter(named.states, isInConflict);
         if (named.isFolder && conflicts.empty())
         {
-            return "no file in it is in conflict";
+            return say("no file in it is in conflict");
         }
-        const bool areLinks = files.empty() && !addressable(conflicts, root).empty();
-        return areLinks ? "only symbolic links are in conflict in it: use \"git add\"" : "";
+        const bool areLinks =
+            solutions(root, named, conflicts).empty() && !addressable(conflicts, root).empty();
+        return areLinks ? say("only symbolic links are in conflict in it: use \"%1%\"", "git add")
+                        : "";
     }
 
-    const CLI::Option *path_ = nullptr;
+    const CLI::Option *paths_ = nullptr;
 };
 
 } // namespace

@@ -5,6 +5,7 @@
 #include "Session.hpp"
 #include "arguments.hpp"
 #include "commands.hpp"
+#include "texts.hpp"
 #include "vclink/git/BranchManager.hpp"
 
 namespace vclink::shell
@@ -17,8 +18,9 @@ class RevisionCommand : public Command
   public:
     void declare(CLI::App &line) override
     {
-        name_ = declareName(line, "NAME", "A revision as git reads it, e.g. main~2 or HEAD:file")
-                    ->required();
+        name_ =
+            declareName(line, "NAME", say("A revision as git reads it, e.g. main~2 or HEAD:file"))
+                ->required();
     }
 
     ExitStatus run(Session &session) override

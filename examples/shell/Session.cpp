@@ -6,7 +6,12 @@
 #include <system_error>
 
 #include "failures.hpp"
+#include "fl/i18n/convert.hpp"
 #include "names.hpp"
+#include "texts.hpp"
+#include "vclink/git/BranchManager.hpp"
+#include "vclink/git/LibGit2Exception.hpp"
+#include "wayOut.hpp"
 #include "workingCopy.hpp"
 
 namespace vclink::shell
@@ -14,20 +19,46 @@ namespace vclink::shell
 namespace
 {
 
+/// Why a repository can't be opened, in the back end's words or better ones.
+std::string explainRefusal(const CMAdapterFactory &factory, const std::filesystem::path &folder,
+                           const std::shared_ptr<ShellInteractor> &interactor)
+{
+    const std::string owner = explainOwner(folder.string());
+    if (!owner.empty())
+    {
+        return owner;
+    }
+    try
+    {
+        const auto adapter = factory.createAdapterFor(makePath(folder), interactor);
+        git::BranchManager::create(*adapter)->getRepositoryState();
+        return {};
+    }
+    catch (const git::LibGit2Exception &failure)
+    {
+        return fl::i18n::ustring_to_utf8(failure.GetUnicodeMessageTxt());
+    }
+    catch (const std::exception &failure)
+    {
+        return failure.what();
+    }
+}
+
 /// What to tell when no folder is served, from the start folder upwards.
-std::string describeSearch(const std::filesystem::path &start)
+std::string describeSearch(const CMAdapterFactory &factory, const std::filesystem::path &start,
+                           const std::shared_ptr<ShellInteractor> &interactor)
 {
     std::string text =
-        "Neither " + start.string() + " nor any folder above it is a Git working copy.";
+        say("Neither %1% nor any folder above it is a Git working copy.", start.string());
     for (std::filesystem::path folder = start; folder.has_relative_path();
          folder = folder.parent_path())
     {
         std::error_code error;
         if (std::filesystem::exists(folder / ".git", error))
         {
-            return text + " There is a repository in " + folder.string() +
-                   ", but it can't be opened: it may belong to another user (see git's setting "
-                   "safe.directory), or be damaged.";
+            return text + '\n' +
+                   say("There is a repository in %1%, but it can't be opened.", folder.string()) +
+                   '\n' + explainRefusal(factory, folder, interactor);
         }
     }
     return text;
@@ -46,16 +77,18 @@ void refuseBareInWorkingCopy(const std::filesystem::path &repository)
         folder = folder.parent_path();
         if (hasGitEntry(folder))
         {
-            throw ShellFailure(repository.string() +
-                               " is a bare repository inside the working copy " + folder.string() +
-                               ". If it came with a clone, its\nconfiguration did too, and may "
-                               "name commands that then run. If you trust it, use --bare.");
+            throw ShellFailure(
+                say("%1% is a bare repository inside the working copy %2%. If it came with a "
+                    "clone, its\nconfiguration did too, and may name commands that then run. If "
+                    "you trust it, use --bare.",
+                    repository.string(), folder.string()));
         }
     }
 }
 
 /// The back end serves the very root of a working copy, so the search upwards is the host's.
-upath findRoot(const CMAdapterFactory &factory, bool takesAnyBare)
+upath findRoot(const CMAdapterFactory &factory, bool takesAnyBare,
+               const std::shared_ptr<ShellInteractor> &interactor)
 {
     const std::filesystem::path start = currentFolder();
     for (std::filesystem::path folder = start;; folder = folder.parent_path())
@@ -72,7 +105,7 @@ upath findRoot(const CMAdapterFactory &factory, bool takesAnyBare)
         }
         if (!folder.has_relative_path())
         {
-            throw ShellFailure(describeSearch(start));
+            throw ShellFailure(describeSearch(factory, start, interactor));
         }
     }
 }
@@ -114,7 +147,8 @@ CMAdapter &Session::adapter()
         {
             // Held until the adapter has a guard of its own, so that libgit2 starts only once.
             const git::LibGit2Guard guard;
-            adapter_ = factory_.createAdapterFor(findRoot(factory_, takesAnyBare_), interactor_);
+            const upath root = findRoot(factory_, takesAnyBare_, interactor_);
+            adapter_ = factory_.createAdapterFor(root, interactor_);
         }
         // Each guard that has ended, those of the search too, took the merge drivers away.
         guard_.emplace();

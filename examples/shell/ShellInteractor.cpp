@@ -23,4 +23,9 @@ Activity &ShellInteractor::activity() noexcept
     return activity_;
 }
 
+bool ShellInteractor::isWriting() const noexcept
+{
+    return progress_.hasBegun();
+}
+
 } // namespace vclink::shell

@@ -21,6 +21,8 @@ class ShellInteractor : public ApplicationInteractor
 
     /// When the back end last reported anything.
     Activity &activity() noexcept;
+    /// Whether files are being written, which can't be cancelled. Any thread.
+    bool isWriting() const noexcept;
 
   private:
     Terminator terminator_;

@@ -5,6 +5,7 @@
 #include "Session.hpp"
 #include "commands.hpp"
 #include "failures.hpp"
+#include "texts.hpp"
 #include "unfinished.hpp"
 #include "vclink/git/BranchManager.hpp"
 
@@ -18,9 +19,8 @@ class StateCommand : public Command
   public:
     void declare(CLI::App &line) override
     {
-        line.footer("\"Normal\", or the operation that is not finished: \"Conflicts\" is a merge, "
-                    "a revert or a\n"
-                    "cherry-pick, also when no file is in conflict.");
+        line.footer(say("\"Normal\", or the operation that is not finished: \"Conflicts\" is a "
+                        "merge, a revert or a cherry-pick,\neven if no file is in conflict."));
     }
 
     ExitStatus run(Session &session) override

@@ -9,7 +9,9 @@
 #include "fl/i18n/convert.hpp"
 #include "namedPaths.hpp"
 #include "names.hpp"
+#include "refusals.hpp"
 #include "states.hpp"
+#include "texts.hpp"
 #include "workingCopy.hpp"
 
 namespace vclink::shell
@@ -19,33 +21,56 @@ namespace
 
 std::string describeStates()
 {
-    std::string text = "One line for each file: its state, a tab, and its path from the root of "
-                       "the working copy.\nIgnored files are left out. The states:\n\n";
+    std::string text =
+        say("One line for each file that is not clean: its state, a tab, and its path "
+            "from the current folder.\nIgnored files are left out. The states:") +
+        "\n\n";
     for (const StateWords &words : stateWords)
     {
         const std::string name = words.name;
-        text += "  " + name + std::string(14 - name.size(), ' ') + words.meaning + '\n';
+        text += "  " + name + std::string(14 - name.size(), ' ') + say(words.meaning) + '\n';
     }
-    text += "\nWithout -z, a name with a control character, a double quote, a backslash or bytes "
-            "that are not\nUTF-8 is shown in double quotes and escaped, as git does. The counts "
-            "go to standard error, if\nthat is a terminal.";
     return text;
+}
+
+/// Why a name has no state, unless there is a file or folder that just has none.
+std::string explain(const upath &root, const NamedPath &named, const FileStateMap &states)
+{
+    const upath path = canonicalForm(named.path);
+    const bool isInside = liesIn(path.string(), root.string());
+    const auto known = states.lower_bound(path);
+    std::error_code ignored;
+    const bool isThere =
+        std::filesystem::exists(std::filesystem::symlink_status(nativePath(named.path), ignored)) ||
+        (known != states.end() && liesIn(known->first.string(), path.string()));
+    return isInside && isThere
+               ? std::string()
+               : explainAbsence(root, {named.argument, isInside ? named.path : path, {}});
 }
 
 /// The states of what the person named. A folder is asked for by itself; all files go in one call.
 FileStateMap collectStates(CMAdapter &adapter, const std::vector<std::string> &arguments)
 {
     FileStateMap states;
+    std::vector<NamedPath> others;
     std::vector<upath> files;
     for (NamedPath &named : lookUpFolders(adapter, arguments))
     {
         if (named.states.empty())
         {
             files.push_back(named.path);
+            others.push_back(named);
         }
         states.merge(named.states);
     }
     FileStateMap single = adapter.getFileStates(files);
+    if (single.empty())
+    {
+        refuseUnknownStates(adapter);
+    }
+    refuseUnless(say("Not every name is known"), others,
+                 [&](const NamedPath &named)
+                 { return explain(adapter.getRootFolder(), named, single); });
     states.merge(single);
     return states;
 }
@@ -56,9 +81,10 @@ class StatusCommand : public Command
     void declare(CLI::App &line) override
     {
         line.footer(describeStates());
+        line.add_flag("-a,--all", showsAll_, say("Show clean files too"));
         line.add_flag("-z", endWithNul_,
-                      "End each line with NUL, and write names byte for byte, without colour");
-        paths_ = declarePaths(line, "Only these files, and all files below these folders");
+                      say("End each line with NUL, and write names byte for byte, without colour"));
+        paths_ = declarePaths(line, say("Only these files, and all files below these folders"));
     }
 
     ExitStatus run(Session &session) override
@@ -71,9 +97,13 @@ class StatusCommand : public Command
         {
             refuseUnknownStates(adapter);
         }
+        const ustring folder = makePath(currentFolder()).string();
         for (const auto &[path, state] : states)
         {
-            writeRecord(session.output(), wordsFor(state), relativeName(path, root));
+            if (showsAll_ || state.getState() != FileState::Clean)
+            {
+                writeRecord(session.output(), wordsFor(state), wayTo(path, folder));
+            }
         }
         session.output().flush();
         remark(countStates(states));
@@ -87,11 +117,17 @@ class StatusCommand : public Command
         std::string record = coloured ? words.colour : "";
         record += words.name;
         record += coloured ? "\33[m\t" : "\t";
-        record += endWithNul_ ? fl::i18n::ustring_to_utf8(name) : quoteName(name);
-        record += endWithNul_ ? '\0' : '\n';
-        output.write(record);
+        if (endWithNul_)
+        {
+            output.writeRaw(record + fl::i18n::ustring_to_utf8(name) + '\0');
+        }
+        else
+        {
+            output.write(record + quoteName(name) + '\n');
+        }
     }
 
+    bool showsAll_ = false;
     bool endWithNul_ = false;
     const CLI::Option *paths_ = nullptr;
 };

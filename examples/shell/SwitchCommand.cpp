@@ -11,6 +11,7 @@
 #include "failures.hpp"
 #include "revisions.hpp"
 #include "runStoppable.hpp"
+#include "texts.hpp"
 
 namespace vclink::shell
 {
@@ -25,8 +26,9 @@ void refuseOtherFiles(const git::BranchManager &manager, const std::string &name
         findRevision(manager, "refs/heads/" + name + "^{tree}");
     if (branch && findRevision(manager, name + "^{tree}") != branch)
     {
-        throw ShellFailure("Nothing was switched: " + name +
-                           " is a tag too, whose files would be taken for the branch's.");
+        throw ShellFailure(say("Nothing was switched: %1% is a tag too, whose files would be taken "
+                               "for the branch's.",
+                               name));
     }
 }
 
@@ -35,13 +37,13 @@ class SwitchCommand : public Command
   public:
     void declare(CLI::App &line) override
     {
-        name_ = declareName(line, "NAME", "A local branch")->required();
+        name_ = declareName(line, "NAME", say("A local branch"))->required();
         line.footer(
-            "Puts the branch's files on the disk, and makes it the current one. Changes to files "
-            "stay where\nboth branches have the same text; otherwise nothing is switched. An "
-            "ignored file that the branch\ntracks is overwritten.\n\n"
-            "Ctrl-C stops it, as long as it still looks for what is to be written: nothing has "
-            "changed then.");
+            say("Writes the branch's files, and makes it the current one. Uncommitted "
+                "changes stay if both branches\nhave the same text there; otherwise nothing "
+                "is switched. Overwrites an ignored file that the branch\ntracks.\n\n"
+                "Ctrl-C stops it until the first file is written: nothing has changed "
+                "then."));
     }
 
     ExitStatus run(Session &session) override
@@ -49,11 +51,11 @@ class SwitchCommand : public Command
         const auto manager = git::BranchManager::create(session.adapter());
         const std::string name = name_->results().front();
         refuseOtherFiles(*manager, name);
-        const ExitStatus status =
-            runStoppable(session, [&manager, &name] { manager->switchBranch(name); });
+        const ExitStatus status = runStoppable(session, Stops::BeforeWriting,
+                                               [&manager, &name] { manager->switchBranch(name); });
         if (status == Done)
         {
-            remark("The current branch is " + name + '.');
+            remark(say("The current branch is %1%.", name));
         }
         return status;
     }

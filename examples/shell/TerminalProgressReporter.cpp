@@ -18,6 +18,7 @@ TerminalProgressReporter::TerminalProgressReporter(ProgressLine &line, Activity 
 void TerminalProgressReporter::setProgress(double fraction)
 {
     activity_.note();
+    hasBegun_.store(true);
     fraction_ = fraction;
 }
 
@@ -31,6 +32,11 @@ void TerminalProgressReporter::setProgressMessage(const ustring &message)
         nextDrawing_ = now + drawingPause;
         line_.draw(fraction_, message);
     }
+}
+
+bool TerminalProgressReporter::hasBegun() const noexcept
+{
+    return hasBegun_.load();
 }
 
 } // namespace vclink::shell

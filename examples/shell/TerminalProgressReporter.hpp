@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include <atomic>
 #include <chrono>
 
 #include "Activity.hpp"
@@ -21,10 +22,13 @@ class TerminalProgressReporter : public ProgressReporter
 
     void setProgress(double fraction) override;
     void setProgressMessage(const ustring &message) override;
+    /// Whether files are being written, or have been. Any thread.
+    bool hasBegun() const noexcept;
 
   private:
     ProgressLine &line_;
     Activity &activity_;
+    std::atomic<bool> hasBegun_{false};
     double fraction_ = 0;
     std::chrono::steady_clock::time_point nextDrawing_{};
 };

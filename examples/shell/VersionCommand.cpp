@@ -18,13 +18,18 @@ class VersionCommand : public Command
 
     ExitStatus run(Session &session) override
     {
-        session.output().write("vclink-shell " VCLINK_SHELL_VERSION "\n");
-        session.output().write("libgit2 " + git::LibGit2Version().toString() + "\n");
+        session.output().write(versionText());
         return Done;
     }
 };
 
 } // namespace
+
+std::string versionText()
+{
+    return "vclink-shell " VCLINK_SHELL_VERSION "\nlibgit2 " + git::LibGit2Version().toString() +
+           '\n';
+}
 
 std::unique_ptr<Command> makeVersionCommand()
 {

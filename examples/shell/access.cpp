@@ -9,6 +9,8 @@
 #include <sys/un.h>
 #include <unistd.h>
 
+#include "texts.hpp"
+
 namespace vclink::shell
 {
 namespace
@@ -45,19 +47,19 @@ std::string explainKey(const git::GitError &failure)
     const char *const agent = std::getenv("SSH_AUTH_SOCK");
     if (agent == nullptr || *agent == '\0')
     {
-        return "The server asked for a key. Keys are taken from an ssh agent only, and "
-               "SSH_AUTH_SOCK names none.\nStart one with \"eval $(ssh-agent)\", and give it the "
-               "key with \"ssh-add\".";
+        return say("The server asked for a key. Keys are taken from an ssh agent only, and "
+                   "SSH_AUTH_SOCK names none.\nStart one with \"eval $(ssh-agent)\", and give it "
+                   "the key with \"ssh-add\".");
     }
     if (!answers(agent))
     {
-        return std::string("The server asked for a key. Keys are taken from an ssh agent only, and "
-                           "the one that\nSSH_AUTH_SOCK names does not answer: ") +
-               agent;
+        return say("The server asked for a key. Keys are taken from an ssh agent only, and the one "
+                   "that\nSSH_AUTH_SOCK names does not answer: %1%",
+                   agent);
     }
     return failure.getCode() == authenticationFailed
-               ? "The server accepts none of the keys that the ssh agent holds; \"ssh-add -l\" "
-                 "shows these."
+               ? say("The server accepts none of the keys that the ssh agent holds; \"ssh-add -l\" "
+                     "shows these.")
                : "";
 }
 
@@ -71,11 +73,11 @@ std::string explainRefusedAccess(const git::GitError &failure, unsigned credenti
     }
     if (credentials == userName)
     {
-        return "The server asked for a user name: put it before the host, as in "
-               "ssh://NAME@HOST/PATH.";
+        return say("The server asked for a user name: put it before the host, as in "
+                   "ssh://NAME@HOST/PATH.");
     }
-    return "The server asked for a password, and none is ever given: only an ssh agent is asked, "
-           "for keys.";
+    return say("The server asked for a password, and none is ever given: only an ssh agent is "
+               "asked, for keys.");
 }
 
 } // namespace vclink::shell

@@ -6,6 +6,8 @@
 
 #include <CLI/CLI.hpp>
 
+#include "texts.hpp"
+
 /// The arguments of commands. They are read with CLI::Option::results(), which has them as given:
 /// in the conversion to a list some versions of CLI11 take "{}" for an empty one. None may be
 /// empty.
@@ -16,7 +18,7 @@ inline CLI::Option *refuseEmpty(CLI::Option *option)
 {
     return option->type_name("")->check(
         [](const std::string &argument)
-        { return argument.empty() ? std::string("it may not be empty") : std::string(); });
+        { return argument.empty() ? say("must not be empty") : std::string(); });
 }
 
 /// Declares one name, of a branch, a revision or a file, at this place of a command's line.

@@ -2,6 +2,7 @@
 #pragma once
 
 #include <memory>
+#include <string>
 
 #include "Command.hpp"
 
@@ -30,5 +31,8 @@ std::unique_ptr<Command> makePushCommand();
 std::unique_ptr<Command> makeHeadsCommand();
 std::unique_ptr<Command> makeProbeCommand();
 std::unique_ptr<Command> makeVersionCommand();
+
+/// The versions of the program and of libgit2, a line each.
+std::string versionText();
 
 } // namespace vclink::shell

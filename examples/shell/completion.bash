@@ -1,13 +1,14 @@
 # SPDX-License-Identifier: MIT
 # shellcheck shell=bash
-# Completion of vclink-shell for bash. Commands and options are what its --help tells.
+# Completion of vclink-shell for bash. Commands and options come from its --help, branches and files
+# from the program, remotes from git.
 
 # The first words of the entries of a section in the help: all that stand before the blanks.
 _vclink_shell_entries()
 {
-    local section=$1
-    shift
-    "$@" --help 2>/dev/null | awk -v section="$section:" '
+    local program=$1 section=$2
+    shift 2
+    "$program" --lang en "$@" --help 2>/dev/null | awk -v section="$section:" '
         /^[A-Z]/ { inside = ($0 == section); next }
         inside && /^  [^ ]/ {
             count = split($1, names, ",")
@@ -15,13 +16,46 @@ _vclink_shell_entries()
         }'
 }
 
+# Names of files in these states, e.g. "modified|missing".
+_vclink_shell_files()
+{
+    local states=$1 record
+    shift
+    while IFS= read -r -d '' record; do
+        if [[ "|$states|" == *"|${record%%$'\t'*}|"* ]]; then printf '%s\n' "${record#*$'\t'}"; fi
+    done < <("$@" status -z 2>/dev/null)
+}
+
+# What can follow a command. COUNT is the number of its arguments so far.
+_vclink_shell_arguments()
+{
+    local command=$1 count=$2
+    shift 2
+    local folders=("${@:2}")
+    case $command in
+        help) _vclink_shell_entries "$1" Commands ;;
+        branch | switch) "$@" branches 2>/dev/null ;;
+        merge) "$@" branches 2>/dev/null && "$@" branches -r 2>/dev/null ;;
+        fetch | push | heads)
+            if ((count == 0)); then
+                git "${folders[@]}" remote 2>/dev/null
+            elif [[ $command == push ]]; then
+                "$@" branches 2>/dev/null
+            fi
+            ;;
+        add) _vclink_shell_files unversioned "$@" ;;
+        revert) _vclink_shell_files 'modified|added|deleted|missing|unknown' "$@" ;;
+        resolved) _vclink_shell_files conflict "$@" ;;
+    esac
+}
+
 _vclink_shell()
 {
-    local program=$1 current=$2 previous=$3 words='' command='' folders=() index word
+    local program=$1 current=$2 previous=$3 command='' folders=() words=() count=0 index word
     COMPREPLY=()
     for ((index = 1; index < COMP_CWORD; ++index)); do
         word=${COMP_WORDS[index]}
-        case "$word" in
+        case "$command$word" in
             -C)
                 folders+=(-C "${COMP_WORDS[index + 1]-}")
                 ((++index))
@@ -29,8 +63,11 @@ _vclink_shell()
             --log | --lang | --progress) ((++index)) ;;
             -*) ;;
             *)
-                command=$word
-                break
+                if [[ -z $command ]]; then
+                    command=$word
+                elif [[ $word != -* ]]; then
+                    ((++count))
+                fi
                 ;;
         esac
     done
@@ -40,31 +77,30 @@ _vclink_shell()
             compopt -o filenames 2>/dev/null
             return
             ;;
-        --log) words='parameter progress diagnostic exception scope-entry scope-exit stack-trace all' ;;
-        --lang) words='de en ja' ;;
-        --progress) words='always auto never' ;;
-        commit-m) return ;;
+        --log) words=(parameter progress diagnostic exception scope-entry scope-exit stack-trace all) ;;
+        --lang) words=(de en ja) ;;
+        --progress) words=(always auto never) ;;
+        commit-m | commit-am) return ;;
         *)
             if [[ -z $command && $current == -* ]]; then
-                words=$(_vclink_shell_entries Options "$program")
+                mapfile -t words < <(_vclink_shell_entries "$program" Options)
             elif [[ -z $command ]]; then
-                words=$(_vclink_shell_entries Commands "$program")
+                mapfile -t words < <(_vclink_shell_entries "$program" Commands)
             elif [[ $current == -* ]]; then
-                words=$(_vclink_shell_entries Options "$program" "$command")
-            elif [[ $command == branch || $command == switch || $command == merge ]]; then
-                words=$("$program" "${folders[@]}" branches 2>/dev/null)
+                mapfile -t words < <(_vclink_shell_entries "$program" Options "$command")
+            else
+                mapfile -t words < <(_vclink_shell_arguments "$command" "$count" "$program" \
+                    "${folders[@]}")
             fi
             ;;
     esac
-    if [[ -n $words ]]; then
-        while read -r word; do
-            if [[ $word != "$current"* ]]; then continue; fi
-            # Names of branches may hold what the shell would expand.
-            printf -v word '%q' "$word"
-            COMPREPLY+=("$word")
-        done < <(tr -s ' ' '\n' <<<"$words")
-    fi
+    for word in "${words[@]}"; do
+        if [[ $word != "$current"* ]]; then continue; fi
+        # Names may hold what the shell would expand.
+        printf -v word '%q' "$word"
+        COMPREPLY+=("$word")
+    done
 }
 
-# Where nothing is offered, the names of files are.
+# If nothing is offered, the names of files are.
 complete -o bashdefault -o default -F _vclink_shell vclink-shell

@@ -1,13 +1,14 @@
 #compdef vclink-shell
 # SPDX-License-Identifier: MIT
-# Completion of vclink-shell for zsh. Commands and options are what its --help tells.
+# Completion of vclink-shell for zsh. Commands and options come from its --help, branches and files
+# from the program, remotes from git.
 
 # The entries of a section in the help, each as WORD:DESCRIPTION.
 _vclink_shell_entries()
 {
-    local section=$1
-    shift
-    "$@" --help 2>/dev/null | awk -v section="$section:" '
+    local program=$1 section=$2
+    shift 2
+    "$program" --lang en "$@" --help 2>/dev/null | awk -v section="$section:" '
         /^[A-Z]/ { inside = ($0 == section); next }
         inside && /^  [^ ]/ {
             count = split($1, names, ",")
@@ -16,12 +17,55 @@ _vclink_shell_entries()
         }'
 }
 
+# Names of files in these states, e.g. "modified|missing", in reply.
+_vclink_shell_files()
+{
+    local states=$1 record
+    shift
+    reply=()
+    for record in "${(@0)$("$@" status -z 2>/dev/null)}"; do
+        [[ "|$states|" == *"|${record%%$'\t'*}|"* ]] && reply+=("${record#*$'\t'}")
+    done
+}
+
+_vclink_shell_arguments()
+{
+    local command=$1 count=$2
+    shift 2
+    local -a names folders=("${@[2,-1]}") reply
+    case $command in
+        help)
+            names=("${(@f)$(_vclink_shell_entries "$1" Commands)}")
+            _describe command names
+            return
+            ;;
+        branch | switch) reply=("${(@f)$("$@" branches 2>/dev/null)}") ;;
+        merge)
+            reply=("${(@f)$("$@" branches 2>/dev/null)}" "${(@f)$("$@" branches -r 2>/dev/null)}")
+            ;;
+        fetch | push | heads)
+            if ((count == 0)); then
+                reply=("${(@f)$(git "${folders[@]}" remote 2>/dev/null)}")
+            elif [[ $command == push ]]; then
+                reply=("${(@f)$("$@" branches 2>/dev/null)}")
+            fi
+            ;;
+        add) _vclink_shell_files unversioned "$@" ;;
+        revert) _vclink_shell_files 'modified|added|deleted|missing|unknown' "$@" ;;
+        resolved) _vclink_shell_files conflict "$@" ;;
+    esac
+    reply=(${reply:#})
+    if (($#reply)) && compadd -- "${reply[@]}"; then return; fi
+    _files
+}
+
 _vclink_shell()
 {
     local program=${(Q)words[1]} command='' index
     local -a folders entries
+    integer count=0
     for ((index = 2; index < CURRENT; ++index)); do
-        case ${words[index]} in
+        case $command${words[index]} in
             -C)
                 folders+=(-C "${(Q)words[index + 1]}")
                 ((++index))
@@ -29,8 +73,11 @@ _vclink_shell()
             --log | --lang | --progress) ((++index)) ;;
             -*) ;;
             *)
-                command=${words[index]}
-                break
+                if [[ -z $command ]]; then
+                    command=${words[index]}
+                elif [[ ${words[index]} != -* ]]; then
+                    ((++count))
+                fi
                 ;;
         esac
     done
@@ -42,22 +89,19 @@ _vclink_shell()
             ;;
         --lang) compadd -- de en ja ;;
         --progress) compadd -- always auto never ;;
-        commit-m) return 1 ;;
+        commit-m | commit-am) return 1 ;;
         *)
             if [[ -z $command && ${words[CURRENT]} == -* ]]; then
-                entries=("${(@f)$(_vclink_shell_entries Options "$program")}")
+                entries=("${(@f)$(_vclink_shell_entries "$program" Options)}")
                 _describe option entries
             elif [[ -z $command ]]; then
-                entries=("${(@f)$(_vclink_shell_entries Commands "$program")}")
+                entries=("${(@f)$(_vclink_shell_entries "$program" Commands)}")
                 _describe command entries
             elif [[ ${words[CURRENT]} == -* ]]; then
-                entries=("${(@f)$(_vclink_shell_entries Options "$program" "$command")}")
+                entries=("${(@f)$(_vclink_shell_entries "$program" Options "$command")}")
                 _describe option entries
-            elif [[ $command == (branch|switch|merge) ]]; then
-                entries=("${(@f)$("$program" "${folders[@]}" branches 2>/dev/null)}")
-                compadd -- "${entries[@]}"
             else
-                _files
+                _vclink_shell_arguments $command $count "$program" "${folders[@]}"
             fi
             ;;
     esac

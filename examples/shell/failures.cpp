@@ -5,10 +5,13 @@
 #include <exception>
 #include <iostream>
 
-#include "fl/i18n/VkLocale.hpp"
+#include <unistd.h>
+
 #include "fl/i18n/convert.hpp"
 #include "foundation/core/except/IUserException.hpp"
 #include "names.hpp"
+#include "texts.hpp"
+#include "vclink/git/LibGit2Exception.hpp"
 #include "vclink/util/exception/CancelledOperationException.hpp"
 
 namespace vclink::shell
@@ -16,27 +19,44 @@ namespace vclink::shell
 namespace
 {
 
-/// Cancellation has no text in the back end's catalogue: what to call it is the host's affair.
-std::string cancelledText()
+void writeToPerson(const std::string &text)
 {
-    const std::string locale = fl::i18n::VkLocale::global().name();
-    const std::string language = locale.substr(0, locale.find_first_of("_.@"));
-    if (language == "de")
+    const std::string printable = makePrintable(fl::i18n::utf8_to_ustring(text));
+    std::cerr << (::isatty(STDERR_FILENO) == 1 ? escapeDirections(printable) : printable) << '\n';
+}
+
+/// A line feed in a text that comes from elsewhere begins no line that looks like the program's.
+std::string indent(std::string text)
+{
+    for (std::size_t place = text.find('\n'); place != std::string::npos;
+         place = text.find('\n', place + 1))
     {
-        return "Der Vorgang wurde abgebrochen.";
+        text.insert(place + 1, "    ");
     }
-    if (language == "ja")
-    {
-        return "操作はキャンセルされました。";
-    }
-    return "The operation was cancelled.";
+    return text;
 }
 
 } // namespace
 
 void complain(const std::string &text)
 {
-    std::cerr << "vclink-shell: " << makePrintable(fl::i18n::utf8_to_ustring(text)) << '\n';
+    writeToPerson("vclink-shell: " + text);
+}
+
+void inform(const std::string &text)
+{
+    writeToPerson(text);
+}
+
+void relay(const std::string &text)
+{
+    std::string lines = "remote: ";
+    for (const char letter : text)
+    {
+        lines += letter;
+        lines += letter == '\n' ? "remote: " : "";
+    }
+    writeToPerson(lines);
 }
 
 ExitStatus reportFailure()
@@ -47,24 +67,32 @@ ExitStatus reportFailure()
     }
     catch (const util::exception::CancelledOperationException &)
     {
-        complain(cancelledText());
+        complain(say("The operation was cancelled."));
         return Cancelled;
     }
     catch (const OutputClosed &)
     {
         return endedBy(SIGPIPE);
     }
+    catch (const git::LibGit2Exception &failure)
+    {
+        complain(indent(fl::i18n::ustring_to_utf8(failure.GetUnicodeMessageTxt())));
+    }
     catch (const foundation::core::except::IUserException &failure)
     {
         complain(fl::i18n::ustring_to_utf8(failure.GetUnicodeMessageTxt()));
     }
-    catch (const std::exception &failure)
+    catch (const ShellFailure &failure)
     {
         complain(failure.what());
     }
+    catch (const std::exception &failure)
+    {
+        complain(indent(failure.what()));
+    }
     catch (...)
     {
-        complain("The command ended with an error of an unknown kind.");
+        complain(say("The command ended with an error of an unknown kind."));
     }
     return Failed;
 }

@@ -30,6 +30,12 @@ class OutputClosed : public std::exception
 /// Writes a line, or a few, to standard error, under the program's name.
 void complain(const std::string &text);
 
+/// Writes a line, or a few, to standard error: what a person needs later, also from a script.
+void inform(const std::string &text);
+
+/// Writes what a server says to standard error, each line marked as the server's.
+void relay(const std::string &text);
+
 /// Tells the person of the exception in flight, in the words that it has for them: its localized
 /// text where it has one. Of OutputClosed it says nothing. To be called in a handler only.
 /// @return the status to end with

@@ -9,6 +9,7 @@
 #include <boost/log/core.hpp>
 
 #include "failures.hpp"
+#include "texts.hpp"
 
 namespace vclink::shell
 {
@@ -26,11 +27,11 @@ void reportLostRecord() noexcept
         }
         catch (const std::exception &failure)
         {
-            complain(std::string("The log is incomplete: ") + failure.what() + '.');
+            complain(say("The log is incomplete: %1%.", failure.what()));
         }
         catch (...)
         {
-            complain("The log is incomplete, for a reason that is not known.");
+            complain(say("The log is incomplete, for a reason that is not known."));
         }
     }
     catch (const std::exception &)

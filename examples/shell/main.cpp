@@ -10,9 +10,10 @@
 #include "ProgressLine.hpp"
 #include "Session.hpp"
 #include "failures.hpp"
-#include "fl/i18n/VkLocale.hpp"
+#include "lineArguments.hpp"
 #include "logFailures.hpp"
-#include "vclink_host/locale.hpp"
+#include "texts.hpp"
+#include "wayOut.hpp"
 
 namespace vclink::shell
 {
@@ -25,7 +26,7 @@ void enterFolder(const std::string &folder)
     std::filesystem::current_path(folder, error);
     if (error)
     {
-        throw ShellFailure("The folder " + folder + " can't be entered: " + error.message() + ".");
+        throw ShellFailure(say("The folder %1% can't be entered: %2%.", folder, error.message()));
     }
 }
 
@@ -46,12 +47,9 @@ ExitStatus runIn(Session &session, Command &command)
     }
     catch (...)
     {
-        if (!session.endingSignal())
-        {
-            throw;
-        }
-        reportFailure();
-        return endedBy(*session.endingSignal());
+        const ExitStatus status = reportFailure();
+        tellWayOut(session);
+        return session.endingSignal() ? endedBy(*session.endingSignal()) : status;
     }
 }
 
@@ -64,10 +62,6 @@ ExitStatus runCommand(const Settings &settings, Command &command, Output &output
         {
             enterFolder(folder);
         }
-    }
-    if (settings.locale)
-    {
-        vclink_host::setGlobalLocale(fl::i18n::VkLocale(*settings.locale));
     }
     surviveLogFailures();
     ProgressLine progressLine(isProgressShown(settings.progress));
@@ -84,6 +78,10 @@ ExitStatus run(int argc, const char *const *argv)
 {
     try
     {
+        if (const std::optional<std::string> locale = findLocale(argc, argv))
+        {
+            setLanguage(*locale);
+        }
         Output output;
         CommandLine line;
         const std::optional<ExitStatus> end = line.parse(argc, argv, output);

@@ -6,11 +6,13 @@
 #include <string>
 #include <system_error>
 
+#include "failures.hpp"
 #include "fl/i18n/convert.hpp"
 #include "namedPaths.hpp"
 #include "names.hpp"
 #include "revisions.hpp"
 #include "states.hpp"
+#include "texts.hpp"
 #include "vclink/git/BranchManager.hpp"
 #include "vclink/git/GitAttributes.hpp"
 #include "workingCopy.hpp"
@@ -138,6 +140,23 @@ FileStateMap findSetAside(const upath &root, const FileStateMap &states)
         }
     }
     return found;
+}
+
+void tellSetAside(CMAdapter &adapter)
+{
+    if (git::BranchManager::create(adapter)->getRepositoryState() == "Normal")
+    {
+        return;
+    }
+    const FileStateMap states = adapter.getFolderStates(adapter.getRootFolder());
+    const FileStateMap files = findSetAside(adapter.getRootFolder(), states);
+    if (!files.empty())
+    {
+        complain(
+            say("These files have another name now, because something else has theirs:%1%\nThe "
+                "merge leaves them out: move what you want to keep to its place, and add it.",
+                listNames(files)));
+    }
 }
 
 } // namespace vclink::shell

@@ -19,4 +19,7 @@ FileStateMap findRefused(CMAdapter &adapter, const FileStateMap &conflicts,
 /// @param states of the whole working copy
 FileStateMap findSetAside(const upath &root, const FileStateMap &states);
 
+/// Names these files to the person, if a merge is under way: its commit lacks them.
+void tellSetAside(CMAdapter &adapter);
+
 } // namespace vclink::shell

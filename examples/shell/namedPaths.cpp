@@ -169,12 +169,37 @@ FileStateMap filter(const FileStateMap &states,
     return meant;
 }
 
-std::string listNames(const FileStateMap &states, const upath &root)
+std::string listNames(const FileStateMap &states)
 {
     std::string names;
+    const ustring folder = states.empty() ? ustring() : makePath(currentFolder()).string();
     for (const auto &[path, state] : states)
     {
-        names += "\n  " + quoteName(relativeName(path, root));
+        names += "\n  " + quoteName(wayTo(path, folder));
+    }
+    return names;
+}
+
+bool isPattern(const ustring &name)
+{
+    return name.find_first_of(u"*?[") != ustring::npos;
+}
+
+std::vector<upath> literalNames(const std::vector<upath> &files, const upath &root)
+{
+    std::vector<upath> names;
+    names.reserve(files.size());
+    for (const upath &file : files)
+    {
+        const ustring name = relativeName(file, root);
+        ustring literal = root.string() + u'/';
+        for (const char16_t unit : name)
+        {
+            literal += isPattern(ustring(1, unit)) ? ustring{u'[', unit, u']'} : ustring(1, unit);
+        }
+        std::error_code ignored;
+        const bool isTaken = fs::exists(fs::symlink_status(nativePath(upath(literal)), ignored));
+        names.push_back(isPattern(name) && !isTaken ? upath(literal) : file);
     }
     return names;
 }

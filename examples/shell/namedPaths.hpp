@@ -56,9 +56,16 @@ upath canonicalForm(const upath &path);
 FileStateMap filter(const FileStateMap &states,
                     const std::function<bool(FileState::State)> &isMeant);
 
-/// For a message: each file by its name relative to the root, on an indented line of its own that a
-/// line feed begins.
-std::string listNames(const FileStateMap &states, const upath &root);
+/// For a message: each file as it is typed in the current folder, on an indented line of its own
+/// that a line feed begins.
+std::string listNames(const FileStateMap &states);
+
+/// Whether the back end takes a name, relative to the root, for a pattern.
+bool isPattern(const ustring &name);
+
+/// The same files under names that mean nothing else: special characters are put in brackets. A
+/// name stays if there is a file with brackets in these places.
+std::vector<upath> literalNames(const std::vector<upath> &files, const upath &root);
 
 /// The files that the back end can be told of by their names.
 std::vector<upath> addressable(const FileStateMap &states, const upath &root);

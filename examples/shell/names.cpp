@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "names.hpp"
 
+#include <algorithm>
 #include <array>
 #include <cstdio>
 #include <string_view>
@@ -8,6 +9,7 @@
 
 #include "failures.hpp"
 #include "fl/i18n/convert.hpp"
+#include "texts.hpp"
 
 namespace vclink::shell
 {
@@ -86,6 +88,13 @@ ustring escape(const ustring &text, std::u16string_view kept, std::u16string_vie
     return escaped;
 }
 
+/// Marks, embeddings, overrides and isolates of bidirectional text.
+bool changesDirection(char16_t unit)
+{
+    return unit == 0x061C || isBetween(unit, 0x200E, 0x200F) || isBetween(unit, 0x202A, 0x202E) ||
+           isBetween(unit, 0x2066, 0x2069);
+}
+
 } // namespace
 
 std::filesystem::path currentFolder()
@@ -94,7 +103,7 @@ std::filesystem::path currentFolder()
     std::filesystem::path folder = std::filesystem::current_path(error);
     if (error)
     {
-        throw ShellFailure("The current folder can't be found: " + error.message() + ".");
+        throw ShellFailure(say("The current folder can't be found: %1%.", error.message()));
     }
     return folder;
 }
@@ -130,11 +139,28 @@ ustring relativeName(const upath &path, const upath &root)
     return text.substr(start);
 }
 
+ustring wayTo(const upath &path, const ustring &folder)
+{
+    const ustring &text = path.string();
+    const bool isBelow = text.size() > folder.size() && text[folder.size()] == u'/' &&
+                         text.compare(0, folder.size(), folder) == 0;
+    return isBelow
+               ? text.substr(folder.size() + 1)
+               : makePath(nativePath(path).lexically_relative(nativePath(upath(folder)))).string();
+}
+
+std::string showPath(const upath &path)
+{
+    return quoteName(wayTo(path, makePath(currentFolder()).string()));
+}
+
 std::string quoteName(const ustring &name)
 {
     const ustring escaped = escape(name, u"", u"\"\\");
     std::string text = fl::i18n::ustring_to_utf8(escaped);
-    return escaped.size() == name.size() ? text : '"' + text + '"';
+    const bool isPlain =
+        escaped.size() == name.size() && std::none_of(name.begin(), name.end(), changesDirection);
+    return isPlain ? text : '"' + text + '"';
 }
 
 std::string makePrintable(const ustring &text)
@@ -145,6 +171,24 @@ std::string makePrintable(const ustring &text)
 std::string makePrintableLine(const ustring &text)
 {
     return fl::i18n::ustring_to_utf8(escape(text, u"", u""));
+}
+
+std::string escapeDirections(const std::string &text)
+{
+    ustring escaped;
+    for (const char16_t unit : fl::i18n::utf8_to_ustring(text))
+    {
+        if (!changesDirection(unit))
+        {
+            escaped += unit;
+            continue;
+        }
+        for (const char byte : fl::i18n::ustring_to_utf8(ustring(1, unit)))
+        {
+            appendOctal(escaped, static_cast<unsigned char>(byte));
+        }
+    }
+    return fl::i18n::ustring_to_utf8(escaped);
 }
 
 } // namespace vclink::shell

@@ -27,9 +27,17 @@ std::filesystem::path nativePath(const upath &path);
 /// The path from `root` to `path`, which lies below it.
 ustring relativeName(const upath &path, const upath &root);
 
+/// The way from a folder to a path, both absolute and free of symbolic links: "." for the folder
+/// itself.
+ustring wayTo(const upath &path, const ustring &folder);
+
+/// A path as a person in the current folder types it, see quoteName().
+std::string showPath(const upath &path);
+
 /// A file name that stays on its line and does nothing to the terminal: where it holds a control
 /// character, a double quote, a backslash or a byte that is not UTF-8, it is put in double quotes
-/// and these are escaped as in C, the way git shows such names. Other names stay as they are.
+/// and these are escaped as in C, the way git shows such names. One with a character that changes
+/// the direction of writing is put in quotes too. Other names stay as they are.
 std::string quoteName(const ustring &name);
 
 /// A text with what could do something to the terminal escaped as in quoteName(), line feeds and
@@ -38,5 +46,9 @@ std::string makePrintable(const ustring &text);
 
 /// As makePrintable(), with line feeds and tabs escaped too.
 std::string makePrintableLine(const ustring &text);
+
+/// What may be written to a terminal: the characters that change the direction of writing, and with
+/// it the order in which a text is read, are escaped as in quoteName().
+std::string escapeDirections(const std::string &text);
 
 } // namespace vclink::shell

@@ -10,6 +10,7 @@
 #include "links.hpp"
 #include "names.hpp"
 #include "states.hpp"
+#include "texts.hpp"
 #include "workingCopy.hpp"
 
 namespace vclink::shell
@@ -19,9 +20,21 @@ namespace
 
 namespace fs = std::filesystem;
 
-bool isPattern(const ustring &name)
+/// Whether anything lies in a folder, or below it, that Git could track.
+bool hasFiles(const fs::path &folder)
 {
-    return name.find_first_of(u"*?[") != ustring::npos;
+    std::error_code error;
+    const auto options = fs::directory_options::skip_permission_denied;
+    for (fs::recursive_directory_iterator entry(folder, options, error), end;
+         !error && entry != end; entry.increment(error))
+    {
+        std::error_code ignored;
+        if (entry->is_symlink(ignored) || entry->is_regular_file(ignored))
+        {
+            return true;
+        }
+    }
+    return false;
 }
 
 /// One question for the whole is cheaper than one for each file, but may be one without an answer.
@@ -66,26 +79,34 @@ std::string explainAbsence(const upath &root, const NamedPath &named)
     const fs::path path = nativePath(named.path);
     if (!liesIn(text, root.string()))
     {
-        return "it lies outside the working copy " + nativePath(root).string();
+        return say("it lies outside the working copy %1%", nativePath(root).string());
     }
     if (text.find(u'\\') != ustring::npos)
     {
-        return "a backslash in a name is taken for a slash";
+        return say("a backslash in a name is taken for a slash");
     }
     if (isFollowed(named.path, root))
     {
-        return "no file of this name is known to Git";
+        return say("no file of this name is known to Git");
     }
     std::error_code ignored;
-    if (isPattern(relativeName(upath(text), root)) && fs::exists(path, ignored))
+    const fs::file_status status = fs::status(path, ignored);
+    if (!fs::exists(status))
     {
-        return "*, ? and [ in a name are taken for a pattern";
+        return say("there is no such file");
     }
-    if (fs::is_directory(path, ignored))
+    if (isPattern(relativeName(upath(text), root)))
     {
-        return "there are no files in it but ignored ones";
+        return say("*, ? and [ in a name are taken for a pattern");
     }
-    return fs::exists(path, ignored) ? "it is ignored by Git" : "there is no such file";
+    if (fs::is_directory(status))
+    {
+        return hasFiles(path) ? say("there are no files in it but ignored ones")
+                              : say("there are no files in it");
+    }
+    return fs::is_regular_file(status)
+               ? say("it is ignored by Git")
+               : say("it is a FIFO, socket or device, which Git does not track");
 }
 
 void refuseStrays(const std::string &refusal, CMAdapter &adapter,
@@ -111,9 +132,11 @@ void refuseStrays(const std::string &refusal, CMAdapter &adapter,
     }
     if (!strays.empty())
     {
-        throw ShellFailure(refusal +
-                           ". A name with *, ? or [ is a pattern, and means these files too:" +
-                           listNames(strays, root) + "\nName them as well, if they are meant.");
+        throw ShellFailure(
+            refusal + ".\n" +
+            say("A name with *, ? or [ is a pattern, and means these files too:%1%\nName them as "
+                "well if you mean them, or use git for the file with that name.",
+                listNames(strays)));
     }
 }
 
@@ -125,7 +148,7 @@ std::string explainUntracked(const upath &root, const NamedPath &named)
     }
     if (filter(named.states, isTracked).empty())
     {
-        return named.isFolder ? "Git tracks no file in it" : "it is not tracked by Git";
+        return named.isFolder ? say("Git tracks no file in it") : say("it is not tracked by Git");
     }
     return {};
 }
@@ -138,8 +161,9 @@ std::string explainLink(const NamedPath &named, const std::string &instead)
     }
     std::error_code ignored;
     const bool isBehind = !fs::is_symlink(nativePath(named.path), ignored);
-    return std::string(isBehind ? "it lies behind a symbolic link" : "it is a symbolic link") +
-           ", which would be followed: use \"" + instead + '"';
+    return isBehind ? say("it lies behind a symbolic link, which would be followed: use \"%1%\"",
+                          instead)
+                    : say("it is a symbolic link, which would be followed: use \"%1%\"", instead);
 }
 
 FileStateMap findLeftOut(CMAdapter &adapter, const FileStateMap &files,
@@ -176,12 +200,12 @@ ExitStatus tellLeftOut(const std::string &refusal, const upath &root, const File
     {
         if (!files.empty())
         {
-            complain(refusal + reason + listNames(files, root));
+            complain(refusal + ", " + reason + listNames(files));
         }
     };
-    tell(", as a backslash in a name is taken for a slash:", unnamable);
-    tell(", as a symbolic link would be followed:", followed);
-    tell(", for a reason that is not known:", others);
+    tell(say("as a backslash in a name is taken for a slash:"), unnamable);
+    tell(say("as a symbolic link would be followed:"), followed);
+    tell(say("for a reason that is not known:"), others);
     return leftOut.empty() ? Done : Failed;
 }
 

@@ -2,11 +2,14 @@
 #pragma once
 
 #include <memory>
+#include <optional>
+#include <string>
 #include <vector>
 
 #include <CLI/CLI.hpp>
 
 #include "fl/ustring.hpp"
+#include "vclink/git/BranchManager.hpp"
 #include "vclink/git/GitRemote.hpp"
 
 namespace vclink::shell
@@ -14,15 +17,30 @@ namespace vclink::shell
 
 class Session;
 
-/// Declares the name of a remote at this place of a command's line.
+/// Which way commits go: git may be told of another remote for pushes.
+enum class Direction
+{
+    Here,
+    There
+};
+
+/// Declares the name of a remote, which may be left out.
 CLI::Option *declareRemote(CLI::App &line);
 
-/// The remote of this name in the working copy that the current folder lies in. The root of that
-/// becomes the current folder: a remote whose address is a relative path is found from there, as by
-/// git, and libgit2 looks from the current folder.
-/// @throws ShellFailure when the current folder lies in no working copy
-std::unique_ptr<git::GitRemote> openRemote(Session &session, const CLI::Option &name);
+/// The remote that is named. Otherwise that of the current branch, as git's settings have it, or
+/// else "origin".
+std::string chooseRemote(Session &session, const CLI::Option &name, Direction direction);
 
-std::vector<ustring> readRefspecs(const CLI::Option &option);
+/// The remote of the adapter's working copy. Its relative addresses are read from the root, as by
+/// git, so that becomes the current folder.
+std::unique_ptr<git::GitRemote> openRemote(Session &session, const std::string &name);
+
+/// Whether git's settings say what is pushed to a remote.
+bool isPushConfigured(Session &session, const std::string &remote);
+
+/// The short name of the current branch; nothing before the first commit, or if none is.
+std::optional<std::string> findCurrentBranch(const git::BranchManager &manager);
+
+std::vector<ustring> readRefspecs(const std::vector<std::string> &refspecs);
 
 } // namespace vclink::shell

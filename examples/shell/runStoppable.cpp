@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "runStoppable.hpp"
 
+#include <atomic>
 #include <csignal>
 #include <string>
 
@@ -8,17 +9,44 @@
 #include "Output.hpp"
 #include "Session.hpp"
 #include "failures.hpp"
+#include "texts.hpp"
 
 namespace vclink::shell
 {
+namespace
+{
 
-ExitStatus runStoppable(Session &session, const std::function<void()> &operation)
+std::string describeRequest(Stops stops, bool isPromised)
+{
+    if (stops == Stops::Never)
+    {
+        return say("This can't be cancelled. It goes on to its end.");
+    }
+    if (!isPromised)
+    {
+        return say("Too late to cancel: files are being written.");
+    }
+    return stops == Stops::WhenServerTalks ? say("Cancelling, as soon as the server answers.")
+                                           : say("Cancelling.");
+}
+
+} // namespace
+
+ExitStatus runStoppable(Session &session, Stops stops, const std::function<void()> &operation)
 {
     ProgressLine &line = session.progressLine();
     ShellInteractor &interactor = *session.interactor();
-    const auto tell = [&line](const std::string &text)
-    { line.clearFor([&text] { complain(text + " Ctrl-C ends the program at once now."); }); };
-    InterruptWatch watch(interactor.getTerminator(), interactor.activity(), tell);
+    std::atomic<bool> isPromised{false};
+    const auto tellAsked = [&]
+    {
+        isPromised.store(stops != Stops::Never && !interactor.isWriting());
+        line.clearFor([&] { remark(describeRequest(stops, isPromised.load())); });
+    };
+    const auto tellGivenUp = [&line](const std::string &text) {
+        line.clearFor([&text]
+                      { complain(text + ' ' + say("Ctrl-C ends the program at once now.")); });
+    };
+    InterruptWatch watch(interactor.getTerminator(), interactor.activity(), tellGivenUp, tellAsked);
     const auto end = [&]
     {
         watch.end();
@@ -26,7 +54,7 @@ ExitStatus runStoppable(Session &session, const std::function<void()> &operation
         {
             session.endBySignal(watch.askedBy());
         }
-        line.clear();
+        line.end();
     };
     try
     {
@@ -43,9 +71,9 @@ ExitStatus runStoppable(Session &session, const std::function<void()> &operation
         return endedBy(watch.askedBy());
     }
     end();
-    if (watch.askedBy() != 0)
+    if (isPromised.load())
     {
-        remark("It was too far on to be stopped.");
+        remark(say("It was done before it could be cancelled."));
     }
     return Done;
 }

@@ -3,6 +3,8 @@
 
 #include <algorithm>
 
+#include "texts.hpp"
+
 namespace vclink::shell
 {
 
@@ -42,7 +44,7 @@ bool isInConflict(FileState::State state)
 
 std::string countFiles(std::size_t count)
 {
-    return std::to_string(count) + (count == 1 ? " file" : " files");
+    return sayCount(count, "%1% file", "%1% files");
 }
 
 std::string countStates(const FileStateMap &states)

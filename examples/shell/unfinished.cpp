@@ -5,9 +5,11 @@
 #include <fstream>
 #include <string>
 #include <system_error>
+#include <vector>
 
 #include "failures.hpp"
 #include "names.hpp"
+#include "texts.hpp"
 #include "vclink/git/BranchManager.hpp"
 #include "workingCopy.hpp"
 
@@ -23,23 +25,30 @@ struct Operation
 {
     /// The back end's word for it.
     const char *state;
-    const char *name;
-    const char *wayOn;
+    std::string description;
 };
 
-constexpr const char *goOnRebasing = "Go on with \"git rebase --continue\"";
-constexpr Operation operations[] = {
-    {"Bisecting", "a bisection", "End it with \"git bisect reset\""},
-    {"Rebase", "a rebase", goOnRebasing},
-    {"Rebase interactive", "a rebase", goOnRebasing},
-    {"Rebase w/merge", "a rebase", goOnRebasing},
-    {"Apply mailbox", "the application of a mailbox", "Go on with \"git am --continue\""},
-    {"Rebase/Apply mailbox", "a rebase or the application of a mailbox",
-     "Go on with \"git rebase --continue\", or \"git am --continue\""}};
+std::vector<Operation> operations()
+{
+    const std::string rebase = say("A rebase is under way. Continue it with \"git rebase "
+                                   "--continue\", or undo it with \"git rebase --abort\".");
+    return {{"Bisecting", say("A bisection is under way. End it with \"git bisect reset\".")},
+            {"Rebase", rebase},
+            {"Rebase interactive", rebase},
+            {"Rebase w/merge", rebase},
+            {"Apply mailbox", say("Patches are being applied. Continue with \"git am "
+                                  "--continue\", or undo it with \"git am --abort\".")},
+            {"Rebase/Apply mailbox",
+             say("A rebase or the application of patches is under way. Continue with \"git rebase "
+                 "--continue\"\nor \"git am --continue\", or undo it with --abort.")}};
+}
+
 /// To the back end one commit that is picked and several are the same.
-constexpr Operation series = {"", "a series of picked or reverted commits",
-                              "Go on with \"git cherry-pick --continue\", or \"git revert "
-                              "--continue\""};
+std::string describeSeries()
+{
+    return say("A series of picked or reverted commits is under way. Continue with \"git "
+               "cherry-pick --continue\"\nor \"git revert --continue\", or undo it with --abort.");
+}
 
 /// Whether commits are still to be picked or reverted after the one that is under way.
 bool isInSeries(const fs::path &root)
@@ -53,17 +62,18 @@ bool isInSeries(const fs::path &root)
     return count > 1;
 }
 
-const Operation *findOperation(CMAdapter &adapter)
+/// What has more to do than one commit; empty if nothing is under way.
+std::string describeOperation(CMAdapter &adapter)
 {
     const std::string state = git::BranchManager::create(adapter)->getRepositoryState();
-    for (const Operation &operation : operations)
+    for (const Operation &operation : operations())
     {
         if (state == operation.state)
         {
-            return &operation;
+            return operation.description;
         }
     }
-    return isInSeries(nativePath(adapter.getRootFolder())) ? &series : nullptr;
+    return isInSeries(nativePath(adapter.getRootFolder())) ? describeSeries() : std::string();
 }
 
 bool stands(CMAdapter &adapter, const char *name)
@@ -72,48 +82,64 @@ bool stands(CMAdapter &adapter, const char *name)
     return fs::exists(stateFolder(nativePath(adapter.getRootFolder())) / name, ignored);
 }
 
-bool isMerging(CMAdapter &adapter)
-{
-    return git::BranchManager::create(adapter)->getRepositoryState() == "Conflicts" &&
-           stands(adapter, "MERGE_HEAD");
-}
-
 } // namespace
 
 void refuseHalfWay(CMAdapter &adapter)
 {
-    if (const Operation *const operation = findOperation(adapter))
+    const std::string operation = describeOperation(adapter);
+    if (!operation.empty())
     {
-        throw ShellFailure(std::string("Nothing was committed, because ") + operation->name +
-                           " is under way.\nThe commit would end it, and drop what is left of it; "
-                           "with --as-is it is made all the same.\n" +
-                           operation->wayOn + '.');
+        throw ShellFailure(
+            say("Nothing was committed. %1%\nA commit would end it and lose the rest "
+                "of it. To commit all the same, use --as-is.",
+                operation));
     }
+}
+
+bool isMergeUnderWay(CMAdapter &adapter)
+{
+    return git::BranchManager::create(adapter)->getRepositoryState() == "Conflicts" &&
+           stands(adapter, "MERGE_HEAD");
 }
 
 bool isMergeInterrupted(CMAdapter &adapter)
 {
     // Of the library; it removes what is left of it once no merge is under way. git's merges leave
     // the other file.
-    return isMerging(adapter) && stands(adapter, "vclink-merge") && !stands(adapter, "AUTO_MERGE");
+    return isMergeUnderWay(adapter) && stands(adapter, "vclink-merge") &&
+           !stands(adapter, "AUTO_MERGE");
 }
 
 std::string describeUnfinishedMerge(CMAdapter &adapter)
 {
-    if (!isMerging(adapter))
+    if (!isMergeUnderWay(adapter))
     {
         return {};
     }
-    return isMergeInterrupted(adapter)
-               ? std::string("A merge was interrupted before all of it was written, and can't be "
-                             "concluded. \"vclink-shell commit\"\nsays so, and names the commands "
-                             "that bring the working copy back as it was before.") +
-                     (stands(adapter, "index.lock")
-                          ? "\nRemove .git/index.lock first, unless another program is using Git "
-                            "here just now."
-                          : "")
-               : "A merge is under way. Conclude it with \"vclink-shell commit\", or undo it with "
-                 "\"git merge --abort\".";
+    if (!isMergeInterrupted(adapter))
+    {
+        return say(
+            "A merge is under way. Conclude it with \"vclink-shell commit\", or undo it with "
+            "\"git merge --abort\".");
+    }
+    const std::string lock =
+        say("Remove .git/index.lock first, unless another program is using Git here just now.");
+    return say("A merge was interrupted before all of it was written, and can't be concluded. "
+               "\"vclink-shell commit\"\nsays so, and names the commands that restore the working "
+               "copy.") +
+           (stands(adapter, "index.lock") ? '\n' + lock : std::string());
+}
+
+std::string describeUnfinished(CMAdapter &adapter)
+{
+    std::string text = describeUnfinishedMerge(adapter);
+    text = text.empty() ? describeOperation(adapter) : text;
+    const bool isNormal = git::BranchManager::create(adapter)->getRepositoryState() == "Normal";
+    return text.empty() && !isNormal
+               ? say("A commit is being picked or reverted. Conclude it with \"vclink-shell "
+                     "commit\", or undo it with\n\"git cherry-pick --abort\" or \"git revert "
+                     "--abort\".")
+               : text;
 }
 
 } // namespace vclink::shell

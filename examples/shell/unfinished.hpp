@@ -12,10 +12,16 @@ namespace vclink::shell
 /// commit of the back end ends it, and the rest is dropped without a word
 void refuseHalfWay(CMAdapter &adapter);
 
+/// Whether a merge is under way, with conflicts or without.
+bool isMergeUnderWay(CMAdapter &adapter);
+
 /// Whether a merge is under way that was killed before all of it was written.
 bool isMergeInterrupted(CMAdapter &adapter);
 
 /// How to go on with a merge that is under way, or that was interrupted; empty if there is none.
 std::string describeUnfinishedMerge(CMAdapter &adapter);
+
+/// How to go on with whatever is under way; empty if nothing is.
+std::string describeUnfinished(CMAdapter &adapter);
 
 } // namespace vclink::shell

@@ -11,6 +11,7 @@
 #include "failures.hpp"
 #include "names.hpp"
 #include "revisions.hpp"
+#include "texts.hpp"
 #include "vclink/git/BranchManager.hpp"
 
 namespace vclink::shell
@@ -72,20 +73,21 @@ std::string explainUnknownStates(CMAdapter &adapter)
 {
     if (isGitmodulesInConflict(adapter))
     {
-        return "The states of the files are not known: .gitmodules is in conflict, and can't be "
-               "read before it\nis resolved. Make it as it should be, and mark it with "
-               "\"vclink-shell resolved\".";
+        return say(
+            "The states of the files are not known: .gitmodules is in conflict, and can't be "
+            "read before it\nis resolved. Edit it, and mark it with \"vclink-shell "
+            "resolved\".");
     }
-    return "The states of the files are not known: libgit2 can't read this working copy. "
-           "\"git status\" may\nsay why: a .gitmodules with an error, a setting with a value that "
-           "it can't have, or folders\nmore than 100 levels deep.";
+    return say("The states of the files are not known: libgit2 can't read this working copy. "
+               "\"git status\" may\nsay why: a .gitmodules with an error, a setting with a value "
+               "that it can't have, or folders\nmore than 100 levels deep.");
 }
 
 std::string explainNoStates()
 {
-    return "No file here has a state: either Git ignores all files, or libgit2 can't read this "
-           "working copy.\n\"git status\" may say which: a setting with a value that it can't "
-           "have, for example.";
+    return say("No file here has a state: either Git ignores all files, or libgit2 can't read this "
+               "working copy.\n\"git status\" may say which: a setting with a value that it can't "
+               "have, for example.");
 }
 
 } // namespace

@@ -76,7 +76,7 @@ TEST_F(ShellAdd, RefusesEachNameThatItCannotServeWithTheReason)
               "Nothing was added:\n"
               "  nothing: there is no such file\n"
               "  x.ignored: it is ignored by Git\n"
-              "  empty: there are no files in it but ignored ones\n"
+              "  empty: there are no files in it\n"
               "  shut: there are no files in it but ignored ones\n"
               "  ../outside: it lies outside the working copy " +
                   repository_.path().string() +
@@ -112,8 +112,9 @@ TEST_F(ShellAdd, RefusesANameThatMeansFilesThatWereNotNamed)
     for (const std::string name : {"a[1].txt", "a1.txt", "x[1]/y", "x1/y"})
         repository_.write(name, "");
     const std::string reason =
-        "Nothing was added. A name with *, ? or [ is a pattern, and means these files too:\n  ";
-    const std::string way = "\nName them as well, if they are meant.\n";
+        "Nothing was added.\nA name with *, ? or [ is a pattern, and means these files too:\n  ";
+    const std::string way =
+        "\nName them as well if you mean them, or use git for the file with that name.\n";
     EXPECT_EQ(refuse({"add", "a[1].txt"}), reason + "a1.txt" + way);
     EXPECT_THAT(refuse({"add", "x[1]"}), HasSubstr("  x[1]: *, ? and [ in a name are taken"));
     succeed({"add", "a[1].txt", "a1.txt", "x1"});

@@ -121,7 +121,7 @@ TEST_F(ShellAttributes, AreRefusedForWhatIsNoFileInTheWorkingCopy)
 {
     for (const std::string path : {"..", "../x", "/", "/etc/passwd", "../repository2/a"})
         EXPECT_EQ(refuse({"attr", path, "text"}),
-                  path + " is no file in the working copy " + repository_.path().string() + ".\n");
+                  path + " is not in the working copy " + repository_.path().string() + ".\n");
 }
 
 } // namespace

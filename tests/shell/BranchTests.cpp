@@ -109,6 +109,8 @@ TEST_F(ShellBranches, AreMadeAtABranchATagOrHead)
     EXPECT_EQ(idOf("one"), idOf("other"));
     EXPECT_EQ(idOf("two"), begin);
     EXPECT_EQ(idOf("three"), begin);
+    succeed({"branch", "four"});
+    EXPECT_EQ(idOf("four"), begin);
     EXPECT_EQ(repository_.line({"symbolic-ref", "HEAD"}), "refs/heads/main");
     EXPECT_EQ(repository_.read("a"), "a\n");
 }
@@ -146,6 +148,9 @@ TEST_F(ShellBranches, AreNotMadeOrDeletedWhereThatCannotBe)
         {{"branch", "topic", "main"}, "a reference with that name already exists"},
         {{"branch", "new", "nothing"}, "no reference found for shorthand 'nothing'"},
         {{"branch", "new", head()}, "no reference found for shorthand"},
+        {{"branch", "new", "main~0"},
+         "\nvclink-shell: START must be the name of a branch or a tag. For any other commit, use "
+         "\"git branch new main~0\".\n"},
         {{"branch", "two words", "main"}, "not valid"},
         {{"branch", "topic/below", "main"}, "topic"},
         {{"branch", "-d", "main"}, "it is the current HEAD"},

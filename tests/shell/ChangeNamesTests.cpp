@@ -178,7 +178,8 @@ TEST_F(ShellChangeOfNamesWithBackslash, TellsThatTheyWereNotReverted)
     repository_.commitAll("odd");
     for (const std::string name : {"folder\\c", "other\\file", "plain"})
         repository_.write(name, "edited\n");
-    EXPECT_EQ(failIn({"revert", "."}), "vclink-shell: Not all were reverted" + leftOut_);
+    EXPECT_EQ(failIn({"revert", "--forget", "."}),
+              "vclink-shell: Not all were reverted" + leftOut_);
     EXPECT_THAT(letters(), ElementsAre(Pair("folder\\c", " M"), Pair("other\\file", " M")));
 }
 

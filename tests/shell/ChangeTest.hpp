@@ -19,7 +19,7 @@ class ChangeTest : public ShellTest
     ChangeTest();
 
     /// Runs the program in the repository. It has to end with 0, and to write nothing, as nobody is
-    /// at a terminal.
+    /// at a terminal, except how to restore what a revert discards.
     void succeed(const std::vector<std::string> &arguments) const;
     /// Runs the program in the repository. It has to end with 1, and to leave everything as it was.
     /// @return what it wrote to standard error, without the program's name

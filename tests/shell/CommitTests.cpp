@@ -65,7 +65,7 @@ TEST_F(ShellCommit, TakesTheMessageAsItStands)
                       "e \xF0\x9F\x8C\x8D"),
           std::string("not UTF-8 \xFF \xE2\x82"), std::string(100'000, 'x')})
     {
-        succeed({"commit", "-m", text});
+        succeed({"commit", "--allow-empty", "--allow-empty-message", "-m", text});
         EXPECT_EQ(message(), text);
     }
 }
@@ -73,7 +73,7 @@ TEST_F(ShellCommit, TakesTheMessageAsItStands)
 TEST_F(ShellCommit, TakesAMessageThatIsGivenInOneWordWithItsOption)
 {
     setIdentity();
-    succeed({"commit", "-mone word"});
+    succeed({"commit", "--allow-empty", "-mone word"});
     EXPECT_EQ(message(), "one word");
 }
 
@@ -81,8 +81,10 @@ TEST_F(ShellCommit, MakesAnIdentityFromTheUserAndTheHost)
 {
     char host[1024] = {};
     ASSERT_EQ(::gethostname(host, sizeof host), 0);
-    const CommandResult result =
-        shell({"commit", "-m", "Work"}).in(repository_.path()).environment("USER", "builder").run();
+    const CommandResult result = shell({"commit", "--allow-empty", "-m", "Work"})
+                                     .in(repository_.path())
+                                     .environment("USER", "builder")
+                                     .run();
     EXPECT_EQ(result.exitStatus, 0) << result.errors;
     EXPECT_EQ(format("%an %ae"), std::string("builder builder@") + host);
 }
@@ -103,8 +105,37 @@ TEST_F(ShellCommit, IsRefusedWhileFilesAreInConflict)
     EXPECT_EQ(refuse({"commit", "-m", "Work"}),
               "Nothing was committed, because these files are in conflict:\n"
               "  a\n"
-              "Make each as it should be, and mark it with \"vclink-shell resolved\". With --as-is "
-              "the commit\ntakes them as they stand, with any conflict markers.\n");
+              "Edit each until it is right, and mark it with \"vclink-shell resolved\". With "
+              "--as-is the commit\ntakes them as they are, with any conflict markers.\n");
+}
+
+TEST_F(ShellCommit, IsRefusedWithoutAMessageOrAChange)
+{
+    setIdentity();
+    EXPECT_EQ(refuse({"commit", "-m", "Work"}),
+              "Nothing was committed: no tracked file has changed.\n");
+    repository_.write("new", "");
+    EXPECT_EQ(refuse({"commit", "-m", "Work"}),
+              "Nothing was committed: no tracked file has changed.\n"
+              "Untracked: 1 file. Add what is to be committed with \"vclink-shell add\".\n");
+    repository_.write("a", "edited\n");
+    for (const std::string text : {"", " \n\t"})
+        EXPECT_EQ(refuse({"commit", "-m", text}), "Nothing was committed: the message is empty.\n");
+    succeed({"commit", "-m", "Work"});
+    EXPECT_THAT(refuse({"commit", "-am", "Work"}), HasSubstr("no tracked file"));
+    succeed({"commit", "--allow-empty", "-am", "[Work]"});
+    EXPECT_EQ(message(), "[Work]");
+}
+
+TEST_F(ShellCommit, ConcludesAMergeThatChangesNothing)
+{
+    setIdentity();
+    makeConflict();
+    repository_.write("a", "ours\n");
+    repository_.write("b", "b\n");
+    repository_.git({"add", "a", "b"});
+    succeed({"commit", "-m", "Ours"});
+    EXPECT_EQ(split(format("%P"), ' ').size(), 2U);
 }
 
 TEST_F(ShellCommit, TakesFilesInConflictAsTheyStandWhenToldTo)

@@ -1,7 +1,11 @@
 // SPDX-License-Identifier: MIT
+#include <chrono>
+#include <filesystem>
+
 #include <gmock/gmock.h>
 
 #include "ShellTest.hpp"
+#include "support/UnprivilegedUser.hpp"
 
 namespace vclink::test
 {
@@ -75,6 +79,61 @@ TEST_F(ShellFailures, SayWhereARepositoryIsThatCannotBeOpened)
     EXPECT_EQ(result.exitStatus, 1);
     EXPECT_THAT(result.errors,
                 HasSubstr("There is a repository in " + repository.path().string() + ", but"));
+}
+
+TEST_F(ShellFailures, SayWhyARepositoryCannotBeOpened)
+{
+    const GitRepository repository = makeRepository();
+    repository.git({"config", "core.repositoryFormatVersion", "9"});
+    EXPECT_THAT(runIn(repository.path(), {"status"}).errors,
+                HasSubstr("unsupported repository version"));
+}
+
+TEST_F(ShellFailures, SayHowARepositoryOfAnotherUserIsTrusted)
+{
+    const GitRepository repository = makeRepository();
+    repository.write("file", "");
+    giveToUnprivilegedUser(repository.path());
+    const CommandResult result = runIn(repository.path(), {"status"});
+    const std::string way =
+        "\nvclink-shell: The repository belongs to nobody. If you trust it, run: "
+        "git config --global --add safe.directory " +
+        repository.path().string() + '\n';
+    EXPECT_EQ(result.errors.find(way) != std::string::npos, runsAsRoot()) << result.errors;
+    EXPECT_EQ(result.exitStatus, runsAsRoot() ? 1 : 0);
+}
+
+TEST_F(ShellFailures, NameTheLockThatWasLeftAndItsAge)
+{
+    GitRepository repository = makeRepository();
+    repository.write("a", "");
+    repository.commitAll("begin");
+    repository.write("new", "");
+    const struct
+    {
+        std::string lock;
+        std::vector<std::string> arguments;
+    } cases[] = {{"index.lock", {"add", "new"}},
+                 {"HEAD.lock", {"switch", "other"}},
+                 {"refs/heads/other.lock", {"branch", "-d", "other"}}};
+    repository.git({"branch", "other"});
+    for (const auto &[lock, arguments] : cases)
+    {
+        const std::filesystem::path path = repository / ".git" / lock;
+        repository.write(".git/" + lock, "");
+        std::filesystem::last_write_time(path, std::filesystem::file_time_type::clock::now() -
+                                                   std::chrono::hours(3) - std::chrono::minutes(1));
+        const CommandResult result = runIn(repository.path(), arguments);
+        EXPECT_EQ(result.exitStatus, 1) << lock;
+        EXPECT_THAT(
+            result.errors,
+            HasSubstr("\nvclink-shell: " + path.string() +
+                      " was made 3 hours ago. If no other program is using Git here, remove "
+                      "it, and try again.\n"));
+        repository.remove(".git/" + lock);
+        EXPECT_EQ(runIn(repository.path(), arguments).exitStatus, 0) << lock;
+        repository.git({"checkout", "--quiet", "main"});
+    }
 }
 
 TEST_F(ShellFailures, SayThatTheFolderToWorkInCannotBeEntered)

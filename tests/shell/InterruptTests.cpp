@@ -12,6 +12,7 @@ namespace vclink::test
 namespace
 {
 
+using testing::AllOf;
 using testing::EndsWith;
 using testing::HasSubstr;
 using testing::Not;
@@ -66,7 +67,8 @@ TEST_F(ShellInterrupt, CancelsARevertAndLeavesAWorkingCopyToGoOnWith)
     const int status = process.wait();
     ASSERT_TRUE(WIFEXITED(status)) << text;
     EXPECT_EQ(WEXITSTATUS(status), 130);
-    EXPECT_THAT(text, EndsWith("\nvclink-shell: The operation was cancelled.\n"));
+    EXPECT_THAT(text, AllOf(HasSubstr("Cancelling.\n"),
+                            EndsWith("vclink-shell: The operation was cancelled.\n")));
 
     EXPECT_EQ(countChanges(), static_cast<std::size_t>(fileCount));
     EXPECT_EQ(statesIn(repository_.path()).size(), static_cast<std::size_t>(fileCount));
@@ -81,7 +83,9 @@ TEST_F(ShellInterrupt, IsToldInTheLanguageThatWasAskedFor)
     TerminalProcess process = start("exec \"$0\" --lang de --log progress revert .");
     process.readUntil("Checkout Notify");
     process.interrupt();
-    EXPECT_THAT(process.readAll(), EndsWith("\nvclink-shell: Der Vorgang wurde abgebrochen.\n"));
+    EXPECT_THAT(process.readAll(),
+                AllOf(HasSubstr("Wird abgebrochen.\n"),
+                      EndsWith("vclink-shell: Der Vorgang wurde abgebrochen.\n")));
     const int status = process.wait();
     ASSERT_TRUE(WIFEXITED(status));
     EXPECT_EQ(WEXITSTATUS(status), 130);
@@ -98,19 +102,21 @@ TEST_F(ShellInterrupt, ChangesNothingMoreWhenItIsRepeated)
     ASSERT_TRUE(WIFEXITED(status)) << text;
     EXPECT_EQ(WEXITSTATUS(status), 130);
     EXPECT_THAT(text, Not(HasSubstr("at once")));
-    EXPECT_THAT(text, EndsWith("\nvclink-shell: The operation was cancelled.\n"));
+    EXPECT_THAT(text, AllOf(HasSubstr("Cancelling.\n"),
+                            EndsWith("vclink-shell: The operation was cancelled.\n")));
 }
 
 TEST_F(ShellInterrupt, ComesTooLateOnceFilesAreWritten)
 {
     TerminalProcess process = start("exec \"$0\" --log parameter revert .");
-    process.readUntil("completed_steps=1 ");
+    process.readUntil("completed_steps=3 ");
     process.interrupt();
     const std::string text = process.readAll();
     const int status = process.wait();
     ASSERT_TRUE(WIFEXITED(status)) << text;
     EXPECT_EQ(WEXITSTATUS(status), 0);
-    EXPECT_THAT(text, EndsWith("It was too far on to be stopped.\nReverted 1000 files.\n"));
+    EXPECT_THAT(text, AllOf(HasSubstr("Too late to cancel: files are being written.\n"),
+                            EndsWith(":/\nReverted 1000 files.\n")));
     EXPECT_EQ(countChanges(), 0U);
 }
 
@@ -125,7 +131,8 @@ TEST_F(ShellInterrupt, OfAnotherKindCancelsToo)
         const int status = process.wait();
         ASSERT_TRUE(WIFEXITED(status)) << text;
         EXPECT_EQ(WEXITSTATUS(status), 128 + signal);
-        EXPECT_THAT(text, EndsWith("\nvclink-shell: The operation was cancelled.\n"));
+        EXPECT_THAT(text, AllOf(HasSubstr("Cancelling.\n"),
+                                EndsWith("vclink-shell: The operation was cancelled.\n")));
         EXPECT_EQ(countChanges(), static_cast<std::size_t>(fileCount));
         EXPECT_FALSE(std::filesystem::exists(repository_ / ".git/index.lock"));
     }
@@ -134,13 +141,14 @@ TEST_F(ShellInterrupt, OfAnotherKindCancelsToo)
 TEST_F(ShellInterrupt, OfAnotherKindLetsTheProgramEndAsByItWhenItComesTooLate)
 {
     TerminalProcess process = start("exec \"$0\" --log parameter revert .");
-    process.readUntil("completed_steps=1 ");
+    process.readUntil("completed_steps=3 ");
     process.send(SIGTERM);
     const std::string text = process.readAll();
     const int status = process.wait();
     ASSERT_TRUE(WIFEXITED(status)) << text;
     EXPECT_EQ(WEXITSTATUS(status), 143);
-    EXPECT_THAT(text, EndsWith("It was too far on to be stopped.\nReverted 1000 files.\n"));
+    EXPECT_THAT(text, AllOf(HasSubstr("Too late to cancel: files are being written.\n"),
+                            EndsWith(":/\nReverted 1000 files.\n")));
     EXPECT_EQ(countChanges(), 0U);
 }
 

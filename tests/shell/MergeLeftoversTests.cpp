@@ -122,7 +122,7 @@ TEST_F(ShellMergeLeftovers, NameGitmodulesInConflict)
     commitFiles({{".gitmodules", base + "ours\n"}});
     const std::string unknown =
         "vclink-shell: The states of the files are not known: .gitmodules is in conflict, and "
-        "can't be read before it\nis resolved. Make it as it should be, and mark it with "
+        "can't be read before it\nis resolved. Edit it, and mark it with "
         "\"vclink-shell resolved\".\n";
     EXPECT_THAT(fail({"merge", "other"}),
                 AllOf(EndsWith(unknown), Not(HasSubstr("No file is in conflict"))));
@@ -149,8 +149,8 @@ class ShellInterruptedMerge : public ShellMergeTest
 
     const std::string recognised_ =
         "vclink-shell: A merge was interrupted before all of it was written, and can't be "
-        "concluded. \"vclink-shell commit\"\nsays so, and names the commands that bring the "
-        "working copy back as it was before.";
+        "concluded. \"vclink-shell commit\"\nsays so, and names the commands that restore the "
+        "working copy.";
 };
 
 TEST_F(ShellInterruptedMerge, IsRecognised)

@@ -117,10 +117,9 @@ TEST_F(ShellMergeOverChanges, TellsHowToBringBackASubmoduleThatIsMissing)
     module.git({"checkout", "--quiet", first});
     commitFiles({{"b", "ours\n"}});
     repository_.remove("module");
-    expectRefused(
-        "\nvclink-shell: The folders of these submodules are missing:\n  module\nBring "
-        "them back with \"git submodule update --init\" first. A commit would leave these "
-        "submodules out.\nvclink-shell: Nothing");
+    expectRefused("\nvclink-shell: The folders of these submodules are missing:\n  module\nRestore "
+                  "them with \"git submodule update --init\" first. A commit would leave these "
+                  "submodules out.\nvclink-shell: Nothing");
     repository_.git({"submodule", "--quiet", "update", "--init"});
     EXPECT_THAT(run({"merge", "other"}).output, StartsWith("Merge commit "));
     EXPECT_EQ(repository_.line({"rev-parse", "HEAD:module"}), second);

@@ -14,8 +14,8 @@ using testing::StartsWith;
 
 const std::string failed = "vclink-shell: \"other\" could not be merged into the current branch.\n";
 const std::string wayOn =
-    "\nMake each as it should be, and mark it with \"vclink-shell resolved\". Then conclude the "
-    "merge\nwith \"vclink-shell commit\".\n";
+    "\nEdit each until it is right, and mark it with \"vclink-shell resolved\". Then conclude the "
+    "merge\nwith \"vclink-shell commit\", or undo it with \"git merge --abort\".\n";
 
 class ShellMerge : public ShellMergeTest
 {

@@ -89,6 +89,9 @@ TEST_F(ShellMergeTool, FailsTheMergeWhenItCannotBeStarted)
     EXPECT_THAT(errors, StartsWith("vclink-shell: \"other\" could not be merged into the current "
                                    "branch.\n"));
     EXPECT_THAT(errors, Not(HasSubstr("in conflict")));
+    EXPECT_THAT(errors, HasSubstr("\nvclink-shell: The merge command can't be started: "
+                                  "'/nowhere/tool' is no program. Correct the setting "
+                                  "merge.vkAutoMerge.driver: /nowhere/tool %O %A %B\n"));
     EXPECT_EQ(head(), before);
     EXPECT_EQ(state(), "Normal\n");
     EXPECT_TRUE(std::filesystem::is_empty(environment().temporary()));

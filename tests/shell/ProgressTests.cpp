@@ -51,15 +51,16 @@ class ShellProgress : public ChangeTest
 
 TEST_F(ShellProgress, IsNotDrawnIntoAPipeUnlessAskedFor)
 {
-    succeed({"revert", "a"});
-    succeed({"--progress", "auto", "revert", "b"});
+    succeed({"revert", "--forget", "a"});
+    succeed({"--progress", "auto", "revert", "--forget", "b"});
     repository_.write("a", "edited\n");
-    succeed({"--progress", "never", "revert", "a"});
+    succeed({"--progress", "never", "revert", "--forget", "a"});
 }
 
 TEST_F(ShellProgress, IsDrawnIntoAPipeWhenAskedForAndTakenAway)
 {
-    const CommandResult result = runIn(repository_.path(), {"--progress", "always", "revert", "a"});
+    const CommandResult result =
+        runIn(repository_.path(), {"--progress", "always", "revert", "--forget", "a"});
     EXPECT_EQ(result.exitStatus, 0);
     EXPECT_EQ(result.output, "");
     EXPECT_EQ(result.errors,
@@ -72,7 +73,7 @@ TEST_F(ShellProgress, IsDrawnInTheLanguageThatWasAskedFor)
     {
         repository_.write("a", "edited\n");
         return runIn(repository_.path(),
-                     {"--lang", language, "--progress", "always", "revert", "a"})
+                     {"--lang", language, "--progress", "always", "revert", "--forget", "a"})
             .errors;
     };
     EXPECT_THAT(run("de"), HasSubstr("% a wird ausgecheckt" + takeLineAway));
@@ -81,14 +82,15 @@ TEST_F(ShellProgress, IsDrawnInTheLanguageThatWasAskedFor)
 
 TEST_F(ShellProgress, IsDrawnOnATerminalAndFollowedByWhatWasDone)
 {
-    EXPECT_EQ(show({"revert", "a"}), takeLineAway + "[####################] 100% Checking out a" +
-                                         takeLineAway + "Reverted 1 file.\n");
+    EXPECT_EQ(show({"revert", "--forget", "a"}), takeLineAway +
+                                                     "[####################] 100% Checking out a" +
+                                                     takeLineAway + "Reverted 1 file.\n");
 }
 
 TEST_F(ShellProgress, IsNotDrawnOnATerminalWhereItIsNotWantedOrCannotBe)
 {
-    EXPECT_EQ(show({"--progress", "never", "revert", "a"}), "Reverted 1 file.\n");
-    EXPECT_EQ(show({"revert", "b"}, "dumb"), "Reverted 1 file.\n");
+    EXPECT_EQ(show({"--progress", "never", "revert", "--forget", "a"}), "Reverted 1 file.\n");
+    EXPECT_EQ(show({"revert", "--forget", "b"}, "dumb"), "Reverted 1 file.\n");
 }
 
 TEST_F(ShellProgress, IsDrawnNoMoreThanTwentyTimesASecondAndAtTheEnd)
@@ -99,7 +101,7 @@ TEST_F(ShellProgress, IsDrawnNoMoreThanTwentyTimesASecondAndAtTheEnd)
     for (int number = 0; number < 1000; ++number)
         repository_.write("many/" + std::to_string(number), "edited\n");
     const auto start = std::chrono::steady_clock::now();
-    const std::string text = show({"--progress", "always", "revert", "many"});
+    const std::string text = show({"--progress", "always", "revert", "--forget", "many"});
     const std::chrono::duration<double> time = std::chrono::steady_clock::now() - start;
     const std::size_t drawn = count(text, "% Checking out ");
     EXPECT_GE(drawn, 1U);
@@ -124,16 +126,18 @@ TEST_F(ShellProgress, IsTakenAwayBeforeAFailureIsTold)
             .run();
     EXPECT_EQ(result.exitStatus, 1);
     EXPECT_THAT(result.errors, StartsWith(takeLineAway + "["));
+    EXPECT_THAT(result.errors, HasSubstr(takeLineAway + "To restore what was discarded: "));
     EXPECT_THAT(result.errors,
-                HasSubstr(takeLineAway + "vclink-shell: Git could not complete the operation: "));
+                HasSubstr(" :/\nvclink-shell: Git could not complete the operation: "));
     EXPECT_EQ(repository_.read("b"), "edited\n");
 }
 
 TEST_F(ShellProgress, GivesWayToRecordsOfTheLog)
 {
-    const std::string errors = runIn(repository_.path(), {"--progress", "always", "--log",
-                                                          "progress,parameter", "revert", "a", "b"})
-                                   .errors;
+    const std::string errors =
+        runIn(repository_.path(), {"--progress", "always", "--log", "progress,parameter", "revert",
+                                   "--forget", "a", "b"})
+            .errors;
     EXPECT_THAT(errors, HasSubstr("Checking out a" + takeLineAway + "[parameter] "));
     EXPECT_THAT(errors, Not(HasSubstr("Checking out a[")));
 }
@@ -144,7 +148,7 @@ TEST_F(ShellProgress, IsNoConcernOfCommandsThatHaveNone)
     EXPECT_EQ(show({"--progress", "always", "add", "new"}), "Added 1 file.\n");
     EXPECT_EQ(show({"add", "folder"}), "There is no new file to add.\n");
     EXPECT_EQ(show({"rm", "folder"}), "Removed 2 files from Git, not from the disk.\n");
-    EXPECT_EQ(show({"resolved", "b"}), "It was in no conflict, and is staged as it stands.\n");
+    EXPECT_EQ(show({"resolved", "b"}), "It was not in conflict, and is staged as it is.\n");
     repository_.git({"config", "user.name", "A"});
     repository_.git({"config", "user.email", "a@example.org"});
     EXPECT_EQ(show({"commit", "-m", "Work"}), "Committed 5 files.\n");

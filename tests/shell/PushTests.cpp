@@ -86,7 +86,10 @@ TEST_F(ShellPush, NamesWhatTheServerRejectsAndPushesTheRest)
         run({"push", "origin", "refs/heads/main", "refs/heads/main:refs/heads/new"});
     EXPECT_EQ(result.exitStatus, 1);
     EXPECT_EQ(result.output, "");
-    EXPECT_EQ(result.errors, "vclink-shell: origin rejected:\n  refs/heads/main: hook declined\n");
+    EXPECT_EQ(result.errors, "remote: closed\n"
+                             "remote: error: hook declined to update refs/heads/main\n"
+                             "vclink-shell: origin rejected:\n"
+                             "  refs/heads/main: hook declined\n");
     EXPECT_EQ(served("refs/heads/main"), before);
     EXPECT_EQ(served("refs/heads/new"), commit_);
 }
@@ -99,33 +102,85 @@ TEST_F(ShellPush, NamesAllThatTheServerRejects)
               "  refs/heads/new: pre-receive hook declined\n");
 }
 
-TEST_F(ShellPush, TellsTheServersWordsInTheLogOnly)
+TEST_F(ShellPush, TellsTheServersWordsMarkedAsSuch)
 {
-    makeHook("pre-receive", "echo Not on a Friday; exit 1\n");
-    EXPECT_THAT(refuse({"push", "origin", "refs/heads/main"}),
-                testing::Not(HasSubstr("Not on a Friday")));
+    makeHook("pre-receive", "echo Not on a Friday; echo 'vclink-shell: lie'; exit 1\n");
+    EXPECT_EQ(run({"push", "origin", "refs/heads/main"}).errors,
+              "remote: Not on a Friday\nremote: vclink-shell: lie\nvclink-shell: origin rejected:\n"
+              "  refs/heads/main: pre-receive hook declined\n");
     const std::string log = run({"--log", "parameter", "push", "origin", "refs/heads/main"}).errors;
     EXPECT_THAT(log, HasSubstr("msgStr=Not on a Friday"));
     EXPECT_THAT(log, HasSubstr("[parameter]  refnameStr=refs/heads/main "
                                "statusStr=pre-receive hook declined\n"));
+    EXPECT_THAT(log, HasSubstr("\nremote: Not on a Friday\nremote: vclink-shell: lie\n"
+                               "vclink-shell: origin rejected:\n"));
 }
 
-TEST_F(ShellPush, TakesWhatIsConfiguredWhereNothingIsNamed)
+TEST_F(ShellPush, TakesWhatIsConfiguredOrTheCurrentBranchWhereNothingIsNamed)
 {
-    EXPECT_EQ(refuse({"push", "origin"}),
-              "Nothing was pushed: no REFSPEC was given, and remote.origin.push is not set.\n");
+    succeed({"push", "origin"});
+    EXPECT_EQ(served("refs/heads/main"), commit_);
     repository_.git({"config", "remote.origin.push", "refs/heads/main:refs/heads/mine"});
     succeed({"push", "origin"});
     EXPECT_EQ(served("refs/heads/mine"), commit_);
+    repository_.git({"config", "--unset", "remote.origin.push"});
+    repository_.git({"checkout", "--quiet", "--detach"});
+    EXPECT_EQ(refuse({"push"}),
+              "Nothing was pushed: there is no current branch. Name what to push.\n");
 }
 
-TEST_F(ShellPush, RefusesWhatIsNoFullNameOrNoCommit)
+TEST_F(ShellPush, ChoosesTheRemoteAsGitDoes)
 {
-    EXPECT_THAT(refuse({"push", "origin", "main"}), HasSubstr("not a valid reference 'main'"));
+    const GitRepository other(folder() / "other");
+    repository_.git({"clone", "--quiet", "--bare", served_.path(), other.path()});
+    repository_.git({"remote", "add", "other", other.path().string()});
+    const struct
+    {
+        std::string key;
+        std::string value;
+        bool goesToOther;
+    } cases[] = {{"branch.main.remote", ".", false},
+                 {"branch.main.remote", "other", true},
+                 {"remote.pushDefault", "origin", false},
+                 {"branch.main.pushRemote", "other", true}};
+    for (const auto &[key, value, goesToOther] : cases)
+    {
+        const std::string name = "refs/heads/" + key + '/' + (value == "." ? "here" : value);
+        repository_.git({"config", key, value});
+        repository_.git({"config", "remote.origin.push", "refs/heads/main:" + name});
+        repository_.git({"config", "remote.other.push", "refs/heads/main:" + name});
+        succeed({"push"});
+        EXPECT_EQ(references(goesToOther ? other : served_).count(name), 1U) << key << value;
+        EXPECT_EQ(references(goesToOther ? served_ : other).count(name), 0U) << key << value;
+    }
+}
+
+TEST_F(ShellPush, CompletesShortNames)
+{
+    repository_.git({"tag", "v1"});
+    repository_.git({"branch", "topic"});
+    succeed({"push", "origin", "topic", "v1", "main:new", "v1:v2", "HEAD:refs/heads/head"});
+    for (const std::string name :
+         {"refs/heads/topic", "refs/tags/v1", "refs/heads/new", "refs/tags/v2", "refs/heads/head"})
+        EXPECT_EQ(served(name), commit_) << name;
+    succeed({"push", "origin", ":topic", ":v2", "+HEAD"});
+    EXPECT_EQ(served("refs/heads/topic") + served("refs/tags/v2"), "");
+    EXPECT_EQ(served("refs/heads/main"), commit_);
+    repository_.git({"tag", "topic"});
+    EXPECT_EQ(refuse({"push", "origin", "topic"}),
+              "Nothing was pushed: there are a branch and a tag 'topic'. Use refs/heads/topic or "
+              "refs/tags/topic.\n");
+    EXPECT_EQ(refuse({"push", "origin", "nothing"}),
+              "Nothing was pushed: there is no branch and no tag 'nothing' here.\n");
+    EXPECT_EQ(refuse({"push", "origin", ":nothing"}),
+              "Nothing was pushed: the remote has no branch and no tag 'nothing'. Use a full name, "
+              "e.g. refs/heads/nothing.\n");
+}
+
+TEST_F(ShellPush, RefusesWhatNamesNoCommit)
+{
     EXPECT_THAT(refuse({"push", "origin", "missing:refs/heads/new"}),
                 HasSubstr("src refspec 'missing' does not match any existing object"));
-    EXPECT_THAT(refuse({"push", "origin", "main:refs/heads/new"}),
-                HasSubstr("no such reference 'main'"));
     EXPECT_THAT(refuse({"push", "nobody", "refs/heads/main"}),
                 HasSubstr("remote 'nobody' does not exist"));
 }
@@ -145,14 +200,18 @@ TEST_F(ShellPush, GoesToAnotherFolderIfThatHasNoFilesOnTheDisk)
     EXPECT_THAT(refuse({"push", "colleague", "refs/heads/main"}), HasSubstr("non-bare"));
 }
 
-TEST_F(ShellPush, TellsAPersonThatItIsDone)
+TEST_F(ShellPush, TellsAPersonWhatWasPushedWhere)
 {
-    EXPECT_EQ(show({"push", "origin", "refs/heads/main"}), "Pushed to origin.\n");
+    EXPECT_EQ(show({"push", "origin", "main", "main:new", "HEAD:refs/heads/third"}),
+              "Pushed main to origin.\nPushed main to new at origin.\n"
+              "Pushed main to third at origin.\n");
+    EXPECT_EQ(show({"push", "origin", ":new"}), "Deleted new at origin.\n");
+    EXPECT_EQ(show({"push"}), "Pushed main to origin.\n");
 }
 
 TEST_F(ShellPush, TellsItsFailureInTheLanguageThatWasAskedFor)
 {
-    EXPECT_THAT(refuse({"--lang", "de", "push", "origin", "main"}),
+    EXPECT_THAT(refuse({"--lang", "de", "push", "nobody", "main"}),
                 StartsWith("Git konnte den Vorgang nicht "));
 }
 

@@ -41,7 +41,7 @@ class ShellRemoteInterrupt : public ShellRemoteTest
         const int status = process.wait();
         EXPECT_TRUE(WIFEXITED(status)) << text;
         EXPECT_EQ(WEXITSTATUS(status), 130) << text;
-        EXPECT_THAT(text, EndsWith("\nvclink-shell: The operation was cancelled.\n"));
+        EXPECT_THAT(text, EndsWith("vclink-shell: The operation was cancelled.\n"));
         return text;
     }
 
@@ -130,6 +130,24 @@ TEST_F(ShellRemoteInterrupt, CancelsAPushWhileTheServerTalks)
     EXPECT_EQ(references(served_), before);
 }
 
+TEST_F(ShellRemoteInterrupt, MarksTheLinesOfAServersError)
+{
+    const std::string error = "ERR no\nvclink-shell: Everything is fine.\n\xE2\x80\xAE";
+    const ScriptedServer server(
+        [&error](Connection &connection)
+        {
+            connection.readUntil("git-upload-pack");
+            connection.write("00" + std::string(1, "0123456789abcdef"[(error.size() + 4) / 16]) +
+                             "0123456789abcdef"[(error.size() + 4) % 16] + error);
+            connection.waitForClose();
+        });
+    repository_.git({"remote", "set-url", "origin", urlAt(server, "/repository.git")});
+    const CommandResult result = run({"fetch"});
+    EXPECT_EQ(result.exitStatus, 1);
+    EXPECT_THAT(result.errors, HasSubstr("no\nremote: vclink-shell: Everything is fine.\n"));
+    EXPECT_THAT(result.errors, Not(HasSubstr("\nvclink-shell: Everything")));
+}
+
 /// A server that takes a request and says nothing.
 class ShellSilentServer : public ShellRemoteInterrupt
 {
@@ -169,6 +187,16 @@ TEST_F(ShellSilentServer, IsGivenUpByASecondCtrlCAfterThreeSecondsAndLeftByAThir
     const int status = process.wait();
     ASSERT_TRUE(WIFSIGNALED(status));
     EXPECT_EQ(WTERMSIG(status), SIGINT);
+}
+
+TEST_F(ShellSilentServer, IsWaitedForWithAClockAndToldOfTheRequest)
+{
+    TerminalProcess process = start({"fetch"});
+    process.readUntil("\r\33[KFetching from origin: 0:00");
+    process.readUntil("\r\33[KFetching from origin: 0:01");
+    process.interrupt();
+    process.readUntil("\r\33[KCancelling.\n");
+    process.readUntil("\r\33[KFetching from origin: 0:03");
 }
 
 TEST_F(ShellSilentServer, IsLeftByTheFirstCtrlCWhereNothingCanBeCancelled)

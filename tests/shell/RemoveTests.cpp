@@ -96,9 +96,9 @@ TEST_F(ShellRemove, RefusesANameThatMeansFilesThatWereNotNamed)
     repository_.write("*", "");
     repository_.commitAll("pattern");
     EXPECT_EQ(refuse({"rm", "*"}),
-              "Nothing was removed. A name with *, ? or [ is a pattern, and means these files "
+              "Nothing was removed.\nA name with *, ? or [ is a pattern, and means these files "
               "too:\n  .gitignore\n  a\n  b\n  folder/c\n  folder/deep/d\n"
-              "Name them as well, if they are meant.\n");
+              "Name them as well if you mean them, or use git for the file with that name.\n");
 }
 
 TEST_F(ShellRemove, TakesASubmoduleAsOneEntry)

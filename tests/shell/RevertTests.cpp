@@ -11,6 +11,7 @@ namespace
 using testing::ElementsAre;
 using testing::IsEmpty;
 using testing::Pair;
+using testing::StartsWith;
 
 class ShellRevert : public ChangeTest
 {
@@ -126,6 +127,76 @@ TEST_F(ShellRevert, IsDoneWhereNothingIsChanged)
     EXPECT_THAT(letters(), IsEmpty());
 }
 
+TEST_F(ShellRevert, KeepsWhatItDiscardsAndSaysHowToRestoreIt)
+{
+    for (const std::string name : {"b", "folder/c", "added"})
+        repository_.write(name, "staged\n");
+    repository_.add({"b", "folder/c", "added"});
+    repository_.write("a", "edited\n");
+    repository_.write("b", "on the disk\n");
+    repository_.remove("folder/c");
+    const CommandResult result = runIn(repository_ / "folder/deep", {"revert", "../.."});
+    EXPECT_EQ(repository_.git({"status", "--porcelain"}), "?? added\n");
+    const std::vector<std::string> lines = split(result.errors, '\n');
+    ASSERT_EQ(lines.size(), 2U) << result.errors;
+    EXPECT_THAT(lines[0], StartsWith("To restore what was discarded: git restore --overlay "));
+    EXPECT_THAT(lines[1], StartsWith("To restore what was staged: git restore --overlay --staged"));
+    for (const std::string &line : lines)
+        EXPECT_EQ(Command({"sh", "-c", line.substr(line.find("git "))})
+                      .in(repository_ / "folder/deep")
+                      .run()
+                      .exitStatus,
+                  0);
+    EXPECT_EQ(repository_.read("a") + repository_.read("b") + repository_.read("folder/c"),
+              "edited\non the disk\nstaged\n");
+    EXPECT_EQ(repository_.git({"show", ":b"}) + repository_.git({"show", ":added"}),
+              "staged\nstaged\n");
+    EXPECT_EQ(repository_.read("folder/deep/d"), "folder/deep/d\n");
+}
+
+TEST_F(ShellRevert, KeepsWhatIsInThePlaceOfAFile)
+{
+    repository_.remove("a");
+    repository_.write("a/notes", "notes\n");
+    repository_.remove("folder");
+    repository_.write("folder", "a file\n");
+    const std::string line = runIn(repository_.path(), {"revert", "."}).errors;
+    EXPECT_EQ(repository_.read("a") + repository_.read("folder/c"), "a\nfolder/c\n");
+    const std::string option = "--source=";
+    const std::size_t start = line.find(option) + option.size();
+    const std::string tree = line.substr(start, line.find(' ', start) - start);
+    EXPECT_EQ(repository_.git({"show", tree + ":a/notes"}), "notes\n");
+    EXPECT_EQ(repository_.git({"show", tree + ":folder"}), "a file\n");
+}
+
+TEST_F(ShellRevert, KeepsNothingWhereNothingIsDiscardedOrWhenToldTo)
+{
+    repository_.write("added", "added\n");
+    repository_.add({"added"});
+    repository_.remove("b");
+    EXPECT_EQ(runIn(repository_.path(), {"revert", "."}).errors, "");
+    repository_.write("a", "edited\n");
+    const std::string before = repository_.git({"count-objects"});
+    EXPECT_EQ(runIn(repository_.path(), {"revert", "--forget", "a"}).errors, "");
+    EXPECT_EQ(repository_.git({"count-objects"}), before);
+    EXPECT_EQ(repository_.read("a"), "a\n");
+}
+
+TEST_F(ShellRevert, DiscardsNothingThatCannotBeKept)
+{
+    repository_.write("a", "edited\n");
+    const CommandResult result = shell({"revert", "a"})
+                                     .in(repository_.path())
+                                     .environment("PATH", folder().path().string())
+                                     .run();
+    EXPECT_EQ(result.exitStatus, 1);
+    EXPECT_EQ(result.errors,
+              "vclink-shell: Nothing was reverted: git can't store what would be discarded. To "
+              "discard it for good, use --forget.\n");
+    EXPECT_EQ(repository_.read("a"), "edited\n");
+    EXPECT_TRUE(std::filesystem::is_empty(environment().temporary()));
+}
+
 TEST_F(ShellRevert, RefusesFilesInConflictAndRevertsNothing)
 {
     makeConflict();
@@ -160,8 +231,9 @@ TEST_F(ShellRevert, RefusesANameThatMeansChangedFilesThatWereNotNamed)
     for (const std::string name : {"a[1].txt", "a1.txt"})
         repository_.write(name, "edited\n");
     EXPECT_EQ(refuse({"revert", "a[1].txt"}),
-              "Nothing was reverted. A name with *, ? or [ is a pattern, and means these files "
-              "too:\n  a1.txt\nName them as well, if they are meant.\n");
+              "Nothing was reverted.\nA name with *, ? or [ is a pattern, and means these files "
+              "too:\n  a1.txt\nName them as well if you mean them, or use git for the file with "
+              "that name.\n");
     succeed({"revert", "a[1].txt", "a1.txt"});
     EXPECT_THAT(letters(), IsEmpty());
 }

@@ -49,7 +49,7 @@ CommandResult ShellTest::runIn(const std::filesystem::path &place,
 Records ShellTest::statesIn(const std::filesystem::path &place,
                             const std::vector<std::string> &names) const
 {
-    std::vector<std::string> arguments{"status", "-z", "--"};
+    std::vector<std::string> arguments{"status", "--all", "-z", "--"};
     arguments.insert(arguments.end(), names.begin(), names.end());
     const CommandResult result = runIn(place, arguments);
     EXPECT_EQ(result.exitStatus, 0) << result.errors;

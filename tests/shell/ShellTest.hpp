@@ -34,7 +34,8 @@ class ShellTest : public GitTest
     /// As shell(), run in a folder.
     CommandResult runIn(const std::filesystem::path &place,
                         std::vector<std::string> arguments) const;
-    /// The states of what is named, told with -z; an unexpected end fails the test.
+    /// The states of what is named, clean files too, told with -z; an unexpected end fails the
+    /// test.
     Records statesIn(const std::filesystem::path &place,
                      const std::vector<std::string> &names = {}) const;
 

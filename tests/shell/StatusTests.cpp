@@ -126,8 +126,11 @@ TEST_F(ShellStatus, WritesOneLineAFileWithATabBetweenStateAndPath)
     repository.write("c", "");
     const CommandResult result = runIn(repository.path(), {"status"});
     EXPECT_EQ(result.exitStatus, 0);
-    EXPECT_EQ(result.output, "clean\ta/a\nclean\tb\nunversioned\tc\n");
+    EXPECT_EQ(result.output, "unversioned\tc\n");
     EXPECT_EQ(result.errors, "");
+    for (const std::string option : {"--all", "-a"})
+        EXPECT_EQ(runIn(repository.path(), {"status", option}).output,
+                  "clean\ta/a\nclean\tb\nunversioned\tc\n");
 }
 
 TEST_F(ShellStatus, WritesNulInsteadOfTheLineFeedWhenAskedTo)
@@ -162,9 +165,11 @@ TEST_F(ShellStatus, ShowsTheWholeWorkingCopyFromAnyFolderInsideIt)
     const GitRepository repository = makeRepository();
     repository.write("top", "");
     repository.write("a/b/deep", "");
-    const Records all{{"unversioned", "a/b/deep"}, {"unversioned", "top"}};
-    EXPECT_EQ(statesIn(repository / "a/b"), all);
-    EXPECT_EQ(statesIn(repository / ".git/refs"), all);
+    EXPECT_THAT(statesIn(repository / "a/b"),
+                ElementsAre(Record("unversioned", "deep"), Record("unversioned", "../../top")));
+    EXPECT_THAT(
+        statesIn(repository / ".git/refs"),
+        ElementsAre(Record("unversioned", "../../a/b/deep"), Record("unversioned", "../../top")));
 }
 
 TEST_F(ShellStatus, ShowsOnlyWhatIsNamed)
@@ -195,9 +200,10 @@ TEST_F(ShellStatus, TakesNamesFromWhereItIsToWork)
     const GitRepository repository = makeRepository();
     for (const std::string name : {"a/b/deep", "a/near", "top"})
         repository.write(name, "");
-    const Records near{{"unversioned", "a/near"}};
-    EXPECT_EQ(statesIn(repository / "a/b", {"../near"}), near);
-    EXPECT_EQ(statesIn(repository / "a", {(repository / "a/near").string()}), near);
+    EXPECT_THAT(statesIn(repository / "a/b", {"../near"}),
+                ElementsAre(Record("unversioned", "../near")));
+    EXPECT_THAT(statesIn(repository / "a", {(repository / "a/near").string()}),
+                ElementsAre(Record("unversioned", "near")));
     for (const std::vector<std::string> &arguments :
          {std::vector<std::string>{"-C", "repository/a", "status", "near"},
           {"-C", (repository / "a").string(), "status", "near"},
@@ -205,7 +211,7 @@ TEST_F(ShellStatus, TakesNamesFromWhereItIsToWork)
     {
         const CommandResult result = shell(arguments).run();
         EXPECT_EQ(result.exitStatus, 0);
-        EXPECT_EQ(result.output, "unversioned\ta/near\n");
+        EXPECT_EQ(result.output, "unversioned\tnear\n");
     }
 }
 
@@ -224,14 +230,43 @@ TEST_F(ShellStatus, ShowsMissingFilesByNameAndBelowAMissingFolder)
     EXPECT_THAT(statesIn(repository.path(), {"gone/b"}), ElementsAre(Record("missing", "gone/b")));
 }
 
-TEST_F(ShellStatus, ShowsNothingForNamesThatNoFileHasAndForIgnoredFiles)
+TEST_F(ShellStatus, NamesCanBePastedIntoTheNextCommand)
+{
+    const GitRepository repository = makeRepository();
+    for (const std::string name : {"a/b/deep", "a b/near", "top", "a/b2"})
+        repository.write(name, "");
+    for (const std::string place : {"a/b", "a", "a b"})
+    {
+        repository.git({"reset", "--quiet"});
+        for (const auto &[state, name] : statesIn(repository / place))
+            EXPECT_EQ(runIn(repository / place, {"add", name}).errors, "") << name;
+        EXPECT_EQ(split(repository.git({"ls-files", "-z"}), '\0').size(), 4U) << place;
+    }
+}
+
+TEST_F(ShellStatus, FailsForNamesThatNoFileHas)
+{
+    const GitRepository repository = makeRepository();
+    repository.write("new", "");
+    const CommandResult result =
+        runIn(repository.path(), {"status", "new", "nothing", "/etc/passwd", "new/below"});
+    EXPECT_EQ(result.exitStatus, 1);
+    EXPECT_EQ(result.output, "");
+    EXPECT_EQ(result.errors, "vclink-shell: Not every name is known:\n"
+                             "  nothing: there is no such file\n"
+                             "  /etc/passwd: it lies outside the working copy " +
+                                 repository.path().string() +
+                                 "\n"
+                                 "  new/below: there is no such file\n");
+}
+
+TEST_F(ShellStatus, ShowsNothingForIgnoredFilesAndEmptyFolders)
 {
     const GitRepository repository = makeRepository();
     repository.write(".gitignore", "ignored\n");
     repository.write("ignored", "");
     std::filesystem::create_directory(repository / "empty");
-    EXPECT_THAT(statesIn(repository.path(), {"nothing", "ignored", "empty", "../elsewhere"}),
-                IsEmpty());
+    EXPECT_THAT(statesIn(repository.path(), {"ignored", "empty"}), IsEmpty());
 }
 
 TEST_F(ShellStatus, ShowsASubmoduleAsOneEntry)

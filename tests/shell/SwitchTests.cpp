@@ -148,7 +148,7 @@ TEST_F(ShellInterruptOfBranches, CancelsASwitchThatHasChangedNothing)
     const std::string before = describe(repository_);
     std::string text;
     EXPECT_EQ(interrupt("exec \"$0\" --log progress switch other", "Checkout Notify", text), 130);
-    EXPECT_THAT(text, EndsWith("\nvclink-shell: The operation was cancelled.\n"));
+    EXPECT_THAT(text, EndsWith("vclink-shell: The operation was cancelled.\n"));
     EXPECT_EQ(repository_.line({"symbolic-ref", "HEAD"}), "refs/heads/main");
     EXPECT_EQ(describe(repository_), before);
     EXPECT_FALSE(std::filesystem::exists(repository_ / ".git/index.lock"));
@@ -159,8 +159,8 @@ TEST_F(ShellInterruptOfBranches, CancelsASwitchThatHasChangedNothing)
 TEST_F(ShellInterruptOfBranches, ComesTooLateOnceFilesAreWritten)
 {
     std::string text;
-    EXPECT_EQ(interrupt("exec \"$0\" --log parameter switch other", "completed_steps=1 ", text), 0);
-    EXPECT_THAT(text, HasSubstr("It was too far on to be stopped.\n"));
+    EXPECT_EQ(interrupt("exec \"$0\" --log parameter switch other", "completed_steps=3 ", text), 0);
+    EXPECT_THAT(text, HasSubstr("Too late to cancel: files are being written.\n"));
     EXPECT_EQ(repository_.line({"symbolic-ref", "HEAD"}), "refs/heads/other");
     EXPECT_EQ(repository_.git({"status", "--porcelain"}), "");
 }

@@ -12,9 +12,8 @@ namespace
 using testing::HasSubstr;
 using testing::Not;
 
-const std::string plainLines = "clean\tclean\nmodified\tedited\nunversioned\tnew\n";
-const std::string colouredLines =
-    "clean\tclean\n\33[33mmodified\33[m\tedited\n\33[36munversioned\33[m\tnew\n";
+const std::string plainLines = "modified\tedited\nunversioned\tnew\n";
+const std::string colouredLines = "\33[33mmodified\33[m\tedited\n\33[36munversioned\33[m\tnew\n";
 const std::string counts = "3 files: 1 clean, 1 modified, 1 unversioned\n";
 
 class ShellOnTerminal : public ShellTest
@@ -84,6 +83,18 @@ TEST_F(ShellOnTerminal, LeavesColoursOutForWhoDoesNotWantOrSeeThem)
 TEST_F(ShellOnTerminal, LeavesColoursOutOfRecordsForPrograms)
 {
     EXPECT_THAT(show("exec \"$0\" \"$@\" status -z"), Not(HasSubstr("\33")));
+}
+
+TEST_F(ShellOnTerminal, EscapesWhatChangesTheDirectionOfWriting)
+{
+    const std::string name = "a\xE2\x80\xAE"
+                             "txt.exe\xE2\x81\xA6\xE2\x80\x8F";
+    repository_.write(name, "");
+    const std::string escaped = "\"a\\342\\200\\256txt.exe\\342\\201\\246\\342\\200\\217\"";
+    EXPECT_THAT(show("exec \"$0\" \"$@\" status"), HasSubstr(escaped + '\n'));
+    EXPECT_THAT(show("cd \"$2\" && ! \"$0\" rm *.exe*"), HasSubstr("  " + escaped + ": it is not"));
+    EXPECT_THAT(show("\"$0\" \"$@\" status 2>&1 | cat"), HasSubstr("\t\"" + name + "\"\n"));
+    EXPECT_THAT(show("\"$0\" \"$@\" status -z"), HasSubstr("\t" + name));
 }
 
 TEST_F(ShellOnTerminal, NamesTheBackEndThatServesAFolder)

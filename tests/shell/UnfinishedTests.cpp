@@ -36,7 +36,7 @@ class ShellUnfinished : public ShellMergeTest
     /// Expects both kinds of refusal: of the conflict, and once that is resolved.
     void expectRefusedAs(const std::string &name) const
     {
-        const std::string reason = "Nothing was committed, because " + name + " is under way.\n";
+        const std::string reason = "Nothing was committed. " + name + " is under way. Continue ";
         EXPECT_THAT(refuse({"commit", "-m", "Work"}), StartsWith(reason));
         repository_.write("a", "solution\n");
         succeed({"resolved", "a"});
@@ -55,10 +55,10 @@ TEST_F(ShellUnfinished, RebasesAreNotCutShort)
     begin({"rebase", "main"});
     EXPECT_EQ(
         refuse({"commit", "-m", "Work"}),
-        "Nothing was committed, because a rebase is under way.\n"
-        "The commit would end it, and drop what is left of it; with --as-is it is made all the "
-        "same.\nGo on with \"git rebase --continue\".\n");
-    expectRefusedAs("a rebase");
+        "Nothing was committed. A rebase is under way. Continue it with \"git rebase "
+        "--continue\", or undo it with \"git rebase --abort\".\nA commit would end it and lose "
+        "the rest of it. To commit all the same, use --as-is.\n");
+    expectRefusedAs("A rebase");
     repository_.git({"-c", "core.editor=true", "rebase", "--continue"});
     EXPECT_EQ(content(), "solution\ntheirs\n");
     EXPECT_EQ(state(), "Normal\n");
@@ -73,7 +73,7 @@ TEST_F(ShellUnfinished, RebasesOfEachKindAreKnown)
           std::vector<std::string>{"rebase", "--merge", "main"}})
     {
         begin(rebase);
-        expectRefusedAs("a rebase");
+        expectRefusedAs("A rebase");
         repository_.git({"rebase", "--abort"});
     }
 }
@@ -84,20 +84,20 @@ TEST_F(ShellUnfinished, MailboxesAreNotCutShort)
     repository_.git({"format-patch", "--output=" + mailbox, "main..other"});
     EXPECT_NE(repository_.tryGit({"am", "--quiet", mailbox}).exitStatus, 0);
     EXPECT_THAT(refuse({"commit", "-m", "Work"}),
-                StartsWith("Nothing was committed, because the application of a mailbox is "));
+                StartsWith("Nothing was committed. Patches are being applied. "));
 }
 
 TEST_F(ShellUnfinished, BisectionsAreNotEnded)
 {
     repository_.git({"bisect", "start"});
     repository_.write("b", "edited\n");
-    EXPECT_THAT(refuse({"commit", "-m", "Work"}), HasSubstr("because a bisection is under way"));
+    EXPECT_THAT(refuse({"commit", "-m", "Work"}), HasSubstr(". A bisection is under way. "));
 }
 
 TEST_F(ShellUnfinished, SeriesOfPicksAreNotCutShort)
 {
     begin({"cherry-pick", "main..other"});
-    expectRefusedAs("a series of picked or reverted commits");
+    expectRefusedAs("A series of picked or reverted commits");
     repository_.git({"-c", "core.editor=true", "cherry-pick", "--continue"});
     EXPECT_EQ(content(), "solution\ntheirs\n");
 }
@@ -106,7 +106,7 @@ TEST_F(ShellUnfinished, SeriesOfRevertsAreNotCutShort)
 {
     commitFiles({{"a", "edited\n"}});
     begin({"revert", "--no-edit", "HEAD~1", "HEAD~2"});
-    expectRefusedAs("a series of picked or reverted commits");
+    expectRefusedAs("A series of picked or reverted commits");
 }
 
 /// git takes the state of the one commit away, the back end says "Normal".
@@ -116,7 +116,7 @@ TEST_F(ShellUnfinished, SeriesAreKnownAlsoBetweenTwoCommits)
     repository_.write("a", "solution\n");
     repository_.git({"commit", "--quiet", "--all", "--message=picked"});
     ASSERT_EQ(state(), "Normal\n");
-    EXPECT_THAT(refuse({"commit", "-m", "Work"}), HasSubstr("a series of picked"));
+    EXPECT_THAT(refuse({"commit", "-m", "Work"}), HasSubstr("A series of picked"));
 }
 
 TEST_F(ShellUnfinished, SeriesAreKnownInALinkedWorkingCopy)
@@ -126,7 +126,7 @@ TEST_F(ShellUnfinished, SeriesAreKnownInALinkedWorkingCopy)
     EXPECT_NE(linked.tryGit({"cherry-pick", "main..other"}).exitStatus, 0);
     const CommandResult result = runIn(linked.path(), {"commit", "-m", "Work"});
     EXPECT_EQ(result.exitStatus, 1);
-    EXPECT_THAT(result.errors, HasSubstr("a series of picked"));
+    EXPECT_THAT(result.errors, HasSubstr("A series of picked"));
     EXPECT_EQ(linked.line({"log", "-1", "--format=%s"}), "work");
     repository_.write("b", "edited\n");
     succeed({"commit", "-m", "Not of the other's concern"});

@@ -96,5 +96,13 @@ expect 'vclink-shell -C har' harbour
 expect 'vclink-shell -C harbour sta' status
 # As it is to stand on the command line.
 expect 'vclink-shell -C birds switch s' 'sea\$\(id\)'
-expect 'vclink-shell add har' harbour
+git -C birds remote add nest $folder/nest
+touch 'birds/a new one' birds/tracked
+git -C birds add tracked
+expect 'vclink-shell -C birds fetch n' nest
+expect 'vclink-shell -C birds push nest m' main
+expect 'vclink-shell -C birds add a' 'a\ new\ one'
+expect 'vclink-shell -C birds revert t' tracked
+expect 'vclink-shell help stat' state
+expect 'vclink-shell rm har' harbour
 exit $((failures > 0))

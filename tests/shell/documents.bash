@@ -51,7 +51,7 @@ for command in "${commands[@]}"; do
     has "$(offers "${command:0:1}")" "$command" || complain "$command is not offered"
     for option in $(entries Options "$command"); do
         if [[ $option != -h && $option != --help ]]; then
-            grep -qE -- "^$option( |\$)" <<<"$(part "\.SS $command")" ||
+            grep -qE -- "(^|, )$option(,| |\$)" <<<"$(part "\.SS $command")" ||
                 complain "the manual page does not have $option of $command"
         fi
         has "$(offers "$command" -)" "$option" ||
@@ -75,5 +75,13 @@ git init --quiet --initial-branch=main "$copy/birds"
 git -C "$copy/birds" -c user.name=A -c user.email=a@example.org commit --quiet --allow-empty -m B
 git -C "$copy/birds" branch "sea\$(id)"
 [[ $(offers -C "$copy/birds" switch s) == "sea\\\$\\(id\\)" ]] || complain "no branch is offered"
+git -C "$copy/birds" remote add nest "$copy/nest"
+touch "$copy/birds/a new one" "$copy/birds/tracked"
+git -C "$copy/birds" add tracked
+[[ $(offers -C "$copy/birds" fetch n) == nest ]] || complain "no remote is offered"
+[[ $(offers -C "$copy/birds" push nest m) == main ]] || complain "no branch to push is offered"
+[[ $(offers -C "$copy/birds" add "") == 'a\ new\ one' ]] || complain "no new file is offered"
+[[ $(offers -C "$copy/birds" revert "") == tracked ]] || complain "no changed file is offered"
+[[ $(offers help sta) == $'status\nstate' ]] || complain "no command is offered to help"
 
 exit $((failures > 0))

@@ -29,7 +29,7 @@ class RunStoppable : public testing::Test
     std::string tell(const std::function<void()> &operation)
     {
         testing::internal::CaptureStderr();
-        status_ = shell::runStoppable(session_, operation);
+        status_ = shell::runStoppable(session_, shell::Stops::BeforeWriting, operation);
         return testing::internal::GetCapturedStderr();
     }
     /// Sends a signal, and goes on when the request has arrived.
@@ -110,7 +110,8 @@ TEST_F(RunStoppable, LeavesTheProgramsStatusToTheCommandAfterCtrlC)
 
 TEST_F(RunStoppable, LeavesOtherFailuresToTheCaller)
 {
-    EXPECT_THROW(shell::runStoppable(session_, [] { throw std::runtime_error("It broke."); }),
+    EXPECT_THROW(shell::runStoppable(session_, shell::Stops::Never,
+                                     [] { throw std::runtime_error("It broke."); }),
                  std::runtime_error);
 }
 

@@ -1,0 +1,216 @@
+// SPDX-License-Identifier: MIT
+#include "translations.hpp"
+
+#include <iterator>
+
+namespace vclink::shell
+{
+namespace
+{
+
+constexpr Translation refusalRows[] = {
+    {"it lies outside the working copy %1%", "liegt außerhalb der Arbeitskopie %1%",
+     "作業コピー %1% の外にあります"},
+    {"a backslash in a name is taken for a slash", "ein Backslash im Namen gilt als Schrägstrich",
+     "名前の中のバックスラッシュはスラッシュとみなされます"},
+    {"no file of this name is known to Git", "Git kennt keine Datei dieses Namens",
+     "この名前のファイルは Git に知られていません"},
+    {"there is no such file", "es gibt keine solche Datei", "そのようなファイルはありません"},
+    {"*, ? and [ in a name are taken for a pattern", "*, ? und [ in einem Namen gelten als Muster",
+     "名前の中の *、?、[ はパターンとみなされます"},
+    {"there are no files in it but ignored ones", "darin liegen nur ignorierte Dateien",
+     "中には無視されるファイルしかありません"},
+    {"there are no files in it", "darin liegen keine Dateien", "中にファイルがありません"},
+    {"it is ignored by Git", "Git ignoriert die Datei", "Git に無視されます"},
+    {"it is a FIFO, socket or device, which Git does not track",
+     "ein FIFO, Socket oder Gerät, was Git nicht verwaltet",
+     "FIFO、ソケット、デバイスのいずれかで、Git は追跡しません"},
+    {"A name with *, ? or [ is a pattern, and means these files too:%1%\nName them as well if you "
+     "mean them, or use git for the file with that name.",
+     "Ein Name mit *, ? oder [ ist ein Muster und meint auch diese Dateien:%1%\nNennen Sie sie "
+     "auch, wenn Sie sie meinen, oder benutzen Sie für die Datei dieses Namens git.",
+     "*、?、[ "
+     "を含む名前はパターンで、次のファイルも対象になります:%1%"
+     "\n対象にするならそれらも指定し、そうでなければその名前のファイルには git を使ってください。"},
+    {"Git tracks no file in it", "Git kennt keine Datei darin",
+     "中に Git が追跡しているファイルはありません"},
+    {"it is not tracked by Git", "Git kennt die Datei nicht", "Git に追跡されていません"},
+    {"it lies behind a symbolic link, which would be followed: use \"%1%\"",
+     "liegt hinter einem symbolischen Link, dem gefolgt würde: Benutzen Sie \"%1%\"",
+     "シンボリックリンクの先にあり、リンクがたどられてしまいます。\"%1%\" を使ってください"},
+    {"it is a symbolic link, which would be followed: use \"%1%\"",
+     "ein symbolischer Link, dem gefolgt würde: Benutzen Sie \"%1%\"",
+     "シンボリックリンクなので、リンクがたどられてしまいます。\"%1%\" を使ってください"},
+    {"as a backslash in a name is taken for a slash:",
+     "weil ein Backslash im Namen als Schrägstrich gilt:",
+     "名前の中のバックスラッシュはスラッシュとみなされます:"},
+    {"as a symbolic link would be followed:", "weil einem symbolischen Link gefolgt würde:",
+     "シンボリックリンクがたどられてしまいます:"},
+    {"for a reason that is not known:", "aus unbekanntem Grund:", "理由は不明です:"},
+    {"A rebase is under way. Continue it with \"git rebase --continue\", or undo it with \"git "
+     "rebase --abort\".",
+     "Ein Rebase läuft. Setzen Sie ihn mit \"git rebase --continue\" fort, oder nehmen Sie ihn "
+     "mit\n\"git rebase --abort\" zurück.",
+     "リベースの途中です。\"git rebase --continue\" で続けるか、\"git rebase --abort\" "
+     "で取り消してください。"},
+    {"A bisection is under way. End it with \"git bisect reset\".",
+     "Eine Bisection läuft. Beenden Sie sie mit \"git bisect reset\".",
+     "二分探索の途中です。\"git bisect reset\" で終わらせてください。"},
+    {"Patches are being applied. Continue with \"git am --continue\", or undo it with \"git am "
+     "--abort\".",
+     "Patches werden angewendet. Fahren Sie mit \"git am --continue\" fort, oder nehmen Sie es "
+     "mit\n\"git am --abort\" zurück.",
+     "パッチを適用している途中です。\"git am --continue\" で続けるか、\"git am --abort\" "
+     "で取り消してください。"},
+    {"A rebase or the application of patches is under way. Continue with \"git rebase "
+     "--continue\"\nor \"git am --continue\", or undo it with --abort.",
+     "Ein Rebase oder das Anwenden von Patches läuft. Fahren Sie mit \"git rebase --continue\" "
+     "oder\n\"git am --continue\" fort, oder nehmen Sie es mit --abort zurück.",
+     "リベースまたはパッチ適用の途中です。\"git rebase --continue\" または \"git am --continue\" "
+     "で続けるか、--abort で\n取り消してください。"},
+    {"A series of picked or reverted commits is under way. Continue with \"git cherry-pick "
+     "--continue\"\nor \"git revert --continue\", or undo it with --abort.",
+     "Eine Reihe von Cherry-Picks oder Reverts läuft. Fahren Sie mit \"git cherry-pick "
+     "--continue\" oder\n\"git revert --continue\" fort, oder nehmen Sie es mit --abort zurück.",
+     "連続したチェリーピックまたはリバートの途中です。\"git cherry-pick --continue\" または \"git "
+     "revert --continue\" で\n続けるか、--abort で取り消してください。"},
+    {"Nothing was committed. %1%\nA commit would end it and lose the rest of it. To commit all the "
+     "same, use --as-is.",
+     "Nichts wurde committet. %1%\nEin Commit würde das beenden und den Rest verlieren. Um "
+     "trotzdem zu committen, benutzen Sie --as-is.",
+     "何もコミットされませんでした。%1%"
+     "\nコミットするとそれが終わり、残りは失われます。それでもコミットするには --as-is "
+     "を使ってください。"},
+    {"A merge is under way. Conclude it with \"vclink-shell commit\", or undo it with \"git merge "
+     "--abort\".",
+     "Ein Merge läuft. Schließen Sie ihn mit \"vclink-shell commit\" ab, oder nehmen Sie ihn "
+     "mit\n\"git merge --abort\" zurück.",
+     "マージの途中です。\"vclink-shell commit\" で完了するか、\"git merge --abort\" "
+     "で取り消してください。"},
+    {"Remove .git/index.lock first, unless another program is using Git here just now.",
+     "Entfernen Sie zuerst .git/index.lock, wenn hier nicht gerade ein anderes Programm mit Git "
+     "arbeitet.",
+     "ほかのプログラムがここで Git を使っていなければ、先に .git/index.lock を削除してください。"},
+    {"A merge was interrupted before all of it was written, and can't be concluded. \"vclink-shell "
+     "commit\"\nsays so, and names the commands that restore the working copy.",
+     "Ein Merge wurde unterbrochen, bevor alles geschrieben war, und kann nicht abgeschlossen "
+     "werden.\n\"vclink-shell commit\" sagt das und nennt die Befehle, die die Arbeitskopie "
+     "wiederherstellen.",
+     "マージがすべて書き込まれる前に中断され、完了できません。\"vclink-shell commit\" "
+     "を実行すると、作業コピーを\n元に戻すコマンドが表示されます。"},
+    {"A commit is being picked or reverted. Conclude it with \"vclink-shell commit\", or undo it "
+     "with\n\"git cherry-pick --abort\" or \"git revert --abort\".",
+     "Ein Cherry-Pick oder Revert läuft. Schließen Sie ihn mit \"vclink-shell commit\" ab, oder "
+     "nehmen Sie\nihn mit \"git cherry-pick --abort\" oder \"git revert --abort\" zurück.",
+     "チェリーピックまたはリバートの途中です。\"vclink-shell commit\" で完了するか、\"git "
+     "cherry-pick --abort\" または\n\"git revert --abort\" で取り消してください。"},
+    {"These files have uncommitted changes:%1%", "Diese Dateien haben Änderungen ohne Commit:%1%",
+     "次のファイルには未コミットの変更があります:%1%"},
+    {"These files are not tracked, and the other side has something in their place:%1%",
+     "Diese Dateien kennt Git nicht, und die andere Seite hat etwas an ihrer Stelle:%1%",
+     "次のファイルは追跡されておらず、相手側の同じ場所に何かがあります:%1%"},
+    {"The folders of these submodules are missing:%1%\nRestore them with \"git submodule update "
+     "--init\" first. A commit would leave these submodules out.",
+     "Die Ordner dieser Submodule fehlen:%1%\nHolen Sie sie zuerst mit \"git submodule update "
+     "--init\" zurück. Einem Commit würden diese Submodule\nfehlen.",
+     "次のサブモジュールのフォルダーがありません:%1%\n先に \"git submodule update --init\" "
+     "で復元してください。コミットするとこれらのサブモジュールがなくなります。"},
+    {"No file is in conflict. Conclude the merge with \"vclink-shell commit\".",
+     "Keine Datei steht in Konflikt. Schließen Sie den Merge mit \"vclink-shell commit\" ab.",
+     "競合しているファイルはありません。\"vclink-shell commit\" でマージを完了してください。"},
+    {"These files are in conflict:%1%\nEdit each until it is right, and mark it with "
+     "\"vclink-shell resolved\". Then conclude the merge\nwith \"vclink-shell commit\", or undo it "
+     "with \"git merge --abort\".",
+     "Diese Dateien stehen in Konflikt:%1%\nBearbeiten Sie jede, bis sie richtig ist, und "
+     "markieren Sie sie mit \"vclink-shell resolved\". Schließen\nSie dann den Merge mit "
+     "\"vclink-shell commit\" ab, oder nehmen Sie ihn mit \"git merge --abort\" zurück.",
+     "次のファイルが競合しています:%1%\nそれぞれを正しく編集し、\"vclink-shell resolved\" "
+     "で解決済みにしてください。その後 \"vclink-shell commit\" で\nマージを完了するか、\"git merge "
+     "--abort\" で取り消してください。"},
+    {"A merge command refused these files. They may be a mix of both sides without conflict "
+     "markers:%1%",
+     "Ein Merge-Befehl hat diese Dateien abgelehnt. Sie können eine Mischung beider Seiten "
+     "ohne\nKonfliktmarkierungen sein:%1%",
+     "マージコマンドが次のファイルを拒否しました。競合マーカーなしで両方の内容が混ざっていることが"
+     "あります:%1%"},
+    {"Nothing was merged. Commit the changes that would be lost, or move the files out of the way, "
+     "and\nmerge again.",
+     "Nichts wurde zusammengeführt. Committen Sie die Änderungen, die verloren gingen, oder räumen "
+     "Sie die\nDateien aus dem Weg, und führen Sie noch einmal zusammen.",
+     "何もマージされませんでした。失われる変更をコミットするか、ファイルを別の場所に移してから、も"
+     "う一度\nマージしてください。"},
+    {"The merge command can't be started: '%1%' is no program. Correct the setting "
+     "merge.%2%.driver: %3%",
+     "Der Merge-Befehl kann nicht gestartet werden: '%1%' ist kein Programm. Berichtigen Sie die "
+     "Einstellung\nmerge.%2%.driver: %3%",
+     "マージコマンドを起動できません。'%1%' はプログラムではありません。設定 merge.%2%.driver "
+     "を直してください: %3%"},
+    {"These files have another name now, because something else has theirs:%1%\nThe merge leaves "
+     "them out: move what you want to keep to its place, and add it.",
+     "Diese Dateien heißen jetzt anders, weil etwas anderes ihren Namen hat:%1%\nIm Merge fehlen "
+     "sie: Bringen Sie an seinen Platz, was Sie behalten wollen, und fügen Sie es hinzu.",
+     "次のファイルは、元の名前を別のものが使っているため、名前が変わっています:%1%"
+     "\nマージには含まれません。残したいものは元の場所に移して追加してください。"},
+    {"Nothing was reverted: git can't store what would be discarded. To discard it for good, use "
+     "--forget.",
+     "Nichts wurde verworfen: git kann nicht speichern, was verworfen würde. Um es endgültig zu "
+     "verwerfen,\nbenutzen Sie --forget.",
+     "何も元に戻されませんでした。破棄する内容を git で保存できません。完全に破棄するには --forget "
+     "を使って\nください。"},
+    {"To restore what was discarded: %1%", "Verworfenes zurückholen: %1%",
+     "破棄した内容を復元するには: %1%"},
+    {"To restore what was staged: %1%", "Vorgemerktes zurückholen: %1%",
+     "ステージした内容を復元するには: %1%"},
+    {"The states of the files are not known: .gitmodules is in conflict, and can't be read before "
+     "it\nis resolved. Edit it, and mark it with \"vclink-shell resolved\".",
+     "Die Zustände der Dateien sind nicht bekannt: .gitmodules steht in Konflikt und kann nicht "
+     "gelesen\nwerden, bevor er gelöst ist. Bearbeiten Sie die Datei, und markieren Sie sie "
+     "mit\n\"vclink-shell resolved\".",
+     "ファイルの状態がわかりません。.gitmodules "
+     "が競合していて、解決するまで読み取れません。編集して、\n\"vclink-shell resolved\" "
+     "で解決済みにしてください。"},
+    {"The states of the files are not known: libgit2 can't read this working copy. \"git status\" "
+     "may\nsay why: a .gitmodules with an error, a setting with a value that it can't have, or "
+     "folders\nmore than 100 levels deep.",
+     "Die Zustände der Dateien sind nicht bekannt: libgit2 kann diese Arbeitskopie nicht lesen. "
+     "\"git status\"\nkann sagen, warum: ein fehlerhaftes .gitmodules, eine Einstellung mit einem "
+     "unmöglichen Wert oder\nOrdner tiefer als 100 Ebenen.",
+     "ファイルの状態がわかりません。libgit2 がこの作業コピーを読み取れません。\"git status\" "
+     "で理由がわかることが\nあります: .gitmodules の誤り、設定の不正な値、100 "
+     "階層より深いフォルダーなど。"},
+    {"No file here has a state: either Git ignores all files, or libgit2 can't read this working "
+     "copy.\n\"git status\" may say which: a setting with a value that it can't have, for example.",
+     "Keine Datei hier hat einen Zustand: Entweder ignoriert Git alle Dateien, oder libgit2 kann "
+     "diese\nArbeitskopie nicht lesen. \"git status\" kann sagen, was: zum Beispiel eine "
+     "Einstellung mit einem\nunmöglichen Wert.",
+     "ここには状態のあるファイルがありません。Git がすべてのファイルを無視しているか、libgit2 "
+     "がこの作業コピーを\n読み取れません。\"git status\" でどちらかわかることがあります "
+     "(設定の不正な値など)。"},
+    {"Nothing was pushed: there are a branch and a tag '%1%'. Use refs/heads/%1% or refs/tags/%1%.",
+     "Nichts wurde hochgeladen: Es gibt einen Branch und einen Tag '%1%'. Schreiben Sie "
+     "refs/heads/%1% oder\nrefs/tags/%1%.",
+     "何も送られませんでした。ブランチとタグの両方に '%1%' があります。refs/heads/%1% または "
+     "refs/tags/%1% と\n指定してください。"},
+    {"Nothing was pushed: the remote has no branch and no tag '%1%'. Use a full name, e.g. "
+     "refs/heads/%1%.",
+     "Nichts wurde hochgeladen: Dort gibt es keinen Branch und keinen Tag '%1%'. Schreiben Sie "
+     "einen vollen\nNamen, z. B. refs/heads/%1%.",
+     "何も送られませんでした。リモートにはブランチもタグも '%1%' がありません。refs/heads/%1% "
+     "のような完全な\n名前を使ってください。"},
+    {"Deleted %1% at %2%.", "%1% bei %2% gelöscht.", "%2% の %1% を削除しました。"},
+    {"Pushed %1% to %2%.", "%1% zu %2% hochgeladen.", "%1% を %2% に送りました。"},
+    {"Pushed %1% to %2% at %3%.", "%1% zu %3% hochgeladen, dort %2%.",
+     "%1% を %3% の %2% に送りました。"},
+    {"Nothing was pushed: there is no branch and no tag '%1%' here.",
+     "Nichts wurde hochgeladen: Hier gibt es keinen Branch und keinen Tag '%1%'.",
+     "何も送られませんでした。ここにはブランチもタグも '%1%' がありません。"},
+};
+
+} // namespace
+
+TranslationTable refusalTexts()
+{
+    return {std::begin(refusalRows), std::size(refusalRows)};
+}
+
+} // namespace vclink::shell

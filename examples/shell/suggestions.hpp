@@ -1,0 +1,20 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <string>
+#include <vector>
+
+namespace vclink::shell
+{
+
+/// " Did you mean '...'?" for the known word that is most like a word that is not known; empty if
+/// none is.
+std::string suggest(const std::string &word, const std::vector<std::string> &known);
+
+/// As suggest(), for the name of a command: also what git calls it.
+std::string suggestCommand(const std::string &word);
+
+/// What to do in place of a command with an option that git has; empty if nothing is known.
+std::string suggestInstead(const std::string &command, const std::string &option);
+
+} // namespace vclink::shell

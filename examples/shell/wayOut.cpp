@@ -1,0 +1,160 @@
+// SPDX-License-Identifier: MIT
+#include "wayOut.hpp"
+
+#include <algorithm>
+#include <chrono>
+#include <filesystem>
+#include <fstream>
+#include <system_error>
+#include <vector>
+
+#include <pwd.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include "Session.hpp"
+#include "failures.hpp"
+#include "names.hpp"
+#include "texts.hpp"
+#include "vclink/git/LibGit2Exception.hpp"
+#include "workingCopy.hpp"
+
+namespace vclink::shell
+{
+namespace
+{
+
+namespace fs = std::filesystem;
+
+// GIT_ELOCKED, GIT_EOWNER.
+constexpr int isLocked = -14;
+constexpr int isOthers = -36;
+
+/// The folder of what all working copies of a repository share.
+fs::path sharedFolder(const fs::path &state)
+{
+    std::ifstream file(state / "commondir");
+    std::string line;
+    return std::getline(file, line) ? state / line : state;
+}
+
+std::vector<fs::path> findLocks(const fs::path &root)
+{
+    std::vector<fs::path> locks;
+    const fs::path state = hasGitEntry(root) ? stateFolder(root) : root;
+    const auto take = [&locks](const fs::path &path)
+    {
+        std::error_code ignored;
+        if (path.extension() == ".lock" && fs::is_regular_file(path, ignored))
+        {
+            locks.push_back(path.lexically_normal());
+        }
+    };
+    for (const fs::path &folder : {state, sharedFolder(state)})
+    {
+        std::error_code ignored;
+        for (const auto &entry : fs::directory_iterator(folder, ignored))
+        {
+            take(entry.path());
+        }
+        for (const auto &entry : fs::recursive_directory_iterator(folder / "refs", ignored))
+        {
+            take(entry.path());
+        }
+    }
+    std::sort(locks.begin(), locks.end());
+    locks.erase(std::unique(locks.begin(), locks.end()), locks.end());
+    return locks;
+}
+
+std::string describeAge(const fs::path &file)
+{
+    using Days = std::chrono::duration<long, std::ratio<86400>>;
+    std::error_code ignored;
+    const auto age = fs::file_time_type::clock::now() - fs::last_write_time(file, ignored);
+    const auto count = [age](auto unit)
+    {
+        const auto number = std::chrono::duration_cast<decltype(unit)>(age).count();
+        return static_cast<std::size_t>(std::max<long>(0, static_cast<long>(number)));
+    };
+    if (age < std::chrono::minutes(2))
+    {
+        return sayCount(count(std::chrono::seconds()), "%1% second", "%1% seconds");
+    }
+    if (age < std::chrono::hours(2))
+    {
+        return sayCount(count(std::chrono::minutes()), "%1% minute", "%1% minutes");
+    }
+    return age < Days(2) ? sayCount(count(std::chrono::hours()), "%1% hour", "%1% hours")
+                         : sayCount(count(Days()), "%1% day", "%1% days");
+}
+
+std::string nameOf(::uid_t user)
+{
+    const ::passwd *const entry = ::getpwuid(user);
+    return entry == nullptr ? std::to_string(user) : entry->pw_name;
+}
+
+} // namespace
+
+void tellWayOut(Session &session)
+{
+    try
+    {
+        throw;
+    }
+    catch (const git::LibGit2Exception &failure)
+    {
+        const int code = failure.getError().getCode();
+        const bool namesSetting =
+            failure.getError().getMessage().find(u"safe.directory") != ustring::npos;
+        if (code == isLocked)
+        {
+            tellLocks(session.adapter());
+        }
+        else if (code == isOthers || namesSetting)
+        {
+            const std::string root = nativePath(session.adapter().getRootFolder()).string();
+            const std::string advice = explainOwner(root);
+            if (!advice.empty())
+            {
+                complain(advice);
+            }
+        }
+    }
+    catch (const std::exception &)
+    {
+        // The text has all that is known.
+    }
+}
+
+void tellLocks(CMAdapter &adapter)
+{
+    const std::vector<fs::path> locks = findLocks(nativePath(adapter.getRootFolder()));
+    for (const fs::path &lock : locks)
+    {
+        complain(say("%1% was made %2% ago. If no other program is using Git here, remove it, and "
+                     "try again.",
+                     quoteName(makePath(lock).string()), describeAge(lock)));
+    }
+    if (locks.empty())
+    {
+        complain(say("Another program was using Git here. Try again."));
+    }
+}
+
+std::string explainOwner(const std::string &folder)
+{
+    struct stat status = {};
+    const bool isKnown =
+        ::stat((folder + "/.git").c_str(), &status) == 0 || ::stat(folder.c_str(), &status) == 0;
+    if (!isKnown || status.st_uid == ::geteuid())
+    {
+        return {};
+    }
+    return say("The repository belongs to %1%. If you trust it, run: git config --global --add "
+               "safe.directory %2%",
+               nameOf(status.st_uid), folder);
+}
+
+} // namespace vclink::shell

@@ -1,0 +1,23 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <string>
+
+#include "vclink/CMAdapter.hpp"
+
+namespace vclink::shell
+{
+
+class Session;
+
+/// Says what to do about the exception in flight, if that is known: which lock was left, or how a
+/// repository of another user is trusted. To be called in a handler only.
+void tellWayOut(Session &session);
+
+/// Names the locks in a repository, and how old they are.
+void tellLocks(CMAdapter &adapter);
+
+/// How a repository of another user is opened; empty if this one belongs to who asks.
+std::string explainOwner(const std::string &folder);
+
+} // namespace vclink::shell
