@@ -8,6 +8,7 @@
 
 #include "BranchCallsTest.hpp"
 #include "support/libgit2/LibGit2Recorder.hpp"
+#include "support/libgit2Release.hpp"
 
 namespace
 {
@@ -89,7 +90,7 @@ TEST_F(CallsOnBranches, OfASwitchHaveTheRecordOfASafeCheckout)
     collectRecords(calls);
     branches().switchBranch("topic");
     ASSERT_THAT(checkouts_, SizeIs(1));
-    expectCheckoutRecord(checkouts_[0], 1);
+    expectCheckoutRecord(checkouts_[0], vclink::test::libgit2Release::safeCheckout);
     EXPECT_THAT(checkoutPaths_[0], IsEmpty());
 }
 

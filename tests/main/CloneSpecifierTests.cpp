@@ -14,6 +14,7 @@
 #include "support/LogCapture.hpp"
 #include "support/UnprivilegedUser.hpp"
 #include "support/WorkingFolder.hpp"
+#include "support/libgit2Release.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
 
 namespace
@@ -121,7 +122,9 @@ TEST_F(CloneSpecifier, ThatIsEmptyFails)
 
 TEST_F(CloneSpecifier, OfAnUnknownSchemeFails)
 {
-    EXPECT_THAT(failureOf("nonsense://host/path").text, testing::HasSubstr("nonsense"));
+    EXPECT_THAT(
+        failureOf("nonsense://host/path").text,
+        testing::HasSubstr(vclink::test::libgit2Release::refusalOfScheme("nonsense://host/path")));
 }
 
 TEST_F(CloneSpecifier, ThatFailsLeavesTheGeneratorAsItWas)

@@ -11,6 +11,7 @@
 #include <unistd.h>
 
 #include "CommitTest.hpp"
+#include "support/libgit2Release.hpp"
 
 namespace
 {
@@ -29,6 +30,8 @@ const Failure emptyIdentity{GIT_ERROR, GIT_ERROR_INVALID,
 const Failure angleBrackets{GIT_ERROR, GIT_ERROR_INVALID,
                             "failed to parse signature - Neither `name` nor `email` should contain "
                             "angle brackets chars."};
+
+const std::string noise(vclink::test::libgit2Release::noiseOfNames);
 
 std::string hostName()
 {
@@ -230,7 +233,7 @@ TEST_F(CommitIdentity, OfAConfiguredEmptyNameIsRefused)
 {
     setVariable("USER", "builder");
     configure("user.email", "ann@example.com");
-    for (const std::string name : {"", "   ", ".,:;"})
+    for (const std::string &name : {std::string(), std::string("   "), noise})
     {
         configure("user.name", name);
         expectFailure(emptyIdentity);
@@ -262,8 +265,8 @@ TEST_F(CommitIdentity, OfAUserWithAngleBracketsIsRefused)
 /// The name of the address is as it was; libgit2 cuts what it takes for noise at the ends.
 TEST_F(CommitIdentity, IsOnlyCleanedUpByLibGit2)
 {
-    setVariable("USER", " the builder. ");
-    EXPECT_EQ(identityAfterCommit(), "the builder <the builder. @" + hostName() + ">");
+    setVariable("USER", " the builder" + noise + " ");
+    EXPECT_EQ(identityAfterCommit(), "the builder <the builder" + noise + " @" + hostName() + ">");
 }
 
 TEST_F(CommitIdentity, KeepsTheBytesOfAName)

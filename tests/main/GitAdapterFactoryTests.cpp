@@ -7,6 +7,7 @@
 #include <gtest/gtest.h>
 
 #include "AdapterTest.hpp"
+#include "support/libgit2Release.hpp"
 #include "support/text.hpp"
 #include "vclink/git/GitAdapterFactory.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
@@ -74,7 +75,9 @@ TEST_F(GitAdapterFactoryTest, LetsTheFirstOperationRaiseForAFolderThatIsNoReposi
         EXPECT_EQ(exception.getError().getCode(), GIT_ENOTFOUND);
         EXPECT_EQ(exception.getError().getErrorClass(), GIT_ERROR_REPOSITORY);
         const std::string own = asUtf8(exception.getError().getMessage());
-        EXPECT_EQ(own, "could not find repository from '" + environment().home().string() + "'");
+        EXPECT_EQ(own, "could not find repository " +
+                           std::string(vclink::test::libgit2Release::whereNoRepositoryIs) + " '" +
+                           environment().home().string() + "'");
         const std::string text = asUtf8(exception.GetUnicodeMessageTxt());
         EXPECT_NE(text.find(own), std::string::npos) << text;
         EXPECT_NE(text.find("-3"), std::string::npos) << text;

@@ -9,6 +9,7 @@
 #include "error/errorUtil/callbackException.hpp"
 #include "support/Descriptors.hpp"
 #include "support/UnprivilegedUser.hpp"
+#include "support/libgit2Release.hpp"
 #include "support/text.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
 
@@ -104,11 +105,12 @@ TEST_F(StatusFailure, OfAFormatThatLibGit2DoesNotKnowIsRaised)
     EXPECT_EQ(raisedBy(*makeAdapter(repository_.path())), GIT_ERROR);
     const auto sha256 = folder() / "sha256";
     repository_.git({"init", "--quiet", "--object-format=sha256", sha256.string()});
-    EXPECT_EQ(raisedBy(*makeAdapter(sha256)), GIT_ERROR);
+    EXPECT_EQ(raisedBy(*makeAdapter(sha256)), vclink::test::libgit2Release::refusalOfSha256);
     const auto extended = makeRepository("extended");
     extended.git({"config", "core.repositoryFormatVersion", "1"});
     extended.git({"config", "extensions.worktreeConfig", "true"});
-    EXPECT_EQ(raisedBy(*makeAdapter(extended.path())), GIT_ERROR);
+    EXPECT_EQ(raisedBy(*makeAdapter(extended.path())),
+              vclink::test::libgit2Release::refusalOfWorktreeConfig);
 }
 
 /// A format that only the walk meets.

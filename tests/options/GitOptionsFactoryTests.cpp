@@ -11,6 +11,7 @@
 
 #include "error/VirtualTable.hpp"
 #include "support/TestInteractor.hpp"
+#include "support/libgit2Release.hpp"
 
 namespace vclink::git
 {
@@ -82,9 +83,10 @@ TEST(GitOptionsFactory, GivesTheSameValuesInBothClasses)
         const CloneOptions clone = factory->makeCloneOptions();
         EXPECT_FALSE(clone.bare);
         EXPECT_FALSE(clone.checkoutBranch.has_value());
-        EXPECT_EQ(clone.checkoutOptions.checkoutStrategy, 1u);
+        EXPECT_EQ(clone.checkoutOptions.checkoutStrategy, test::libgit2Release::safeCheckout);
         EXPECT_EQ(factory->makePushOptions().packbuilderParallelism, 1u);
-        EXPECT_EQ(factory->makeCheckoutOptions().checkoutStrategy, 1u);
+        EXPECT_EQ(factory->makeCheckoutOptions().checkoutStrategy,
+                  test::libgit2Release::safeCheckout);
         // These have no fields that could differ.
         EXPECT_NO_THROW(factory->makeFetchOptions());
         EXPECT_NO_THROW(factory->makeProxyOptions());

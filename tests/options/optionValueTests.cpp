@@ -9,6 +9,7 @@
 #include <gtest/gtest.h>
 
 #include "error/VirtualTable.hpp"
+#include "support/libgit2Release.hpp"
 #include "vclink/git/CheckoutOptions.hpp"
 #include "vclink/git/CloneOptions.hpp"
 #include "vclink/git/FetchOptions.hpp"
@@ -45,7 +46,7 @@ static_assert(std::is_same_v<decltype(CloneOptions::fetchOptions), FetchOptions>
 
 TEST(CheckoutOptions, BeginSafe)
 {
-    EXPECT_EQ(CheckoutOptions().checkoutStrategy, 1u);
+    EXPECT_EQ(CheckoutOptions().checkoutStrategy, test::libgit2Release::safeCheckout);
     EXPECT_EQ(CheckoutOptions().checkoutStrategy, std::uint64_t{GIT_CHECKOUT_SAFE});
 }
 

@@ -3,6 +3,7 @@
 
 #include "ShellRemoteTest.hpp"
 #include "runOnTerminal.hpp"
+#include "support/libgit2Release.hpp"
 #include "transport/listening.hpp"
 
 namespace vclink::test
@@ -137,7 +138,8 @@ TEST_F(ShellClone, TellsWhyThereIsNothingToClone)
     fs::create_directory(folder() / "nothing");
     EXPECT_THAT(fail("nothing"), HasSubstr("could not find repository"));
     EXPECT_THAT(fail("nowhere"), HasSubstr("unsupported URL protocol"));
-    EXPECT_THAT(fail("strange://host/path"), HasSubstr("strange://host/path"));
+    EXPECT_THAT(fail("strange://host/path"),
+                HasSubstr(libgit2Release::refusalOfScheme("strange://host/path")));
     EXPECT_THAT(fail(daemon().base() + "/missing.git"), HasSubstr("no such repository"));
     const std::string silent = std::to_string(freePorts(1).front());
     EXPECT_THAT(fail("git://127.0.0.1:" + silent + "/a.git"), HasSubstr("Connection refused"));

@@ -1,0 +1,70 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <string>
+#include <string_view>
+
+#include <git2/errors.h>
+#include <git2/version.h>
+
+/// What the releases of libgit2 do differently and a test binds, a line each. Tests read it here
+/// and have no conditions on a release of their own. Tried are 1.5 and 1.9: where nothing tells
+/// which release between them brought a difference, it counts as 1.9's.
+namespace vclink::test::libgit2Release
+{
+
+constexpr bool isSince(int major, int minor)
+{
+    return LIBGIT2_VER_MAJOR > major || (LIBGIT2_VER_MAJOR == major && LIBGIT2_VER_MINOR >= minor);
+}
+
+/// Looking a remote up and deleting a branch lose memory, more with every entry of the
+/// configuration.
+constexpr bool losesMemory = !isSince(1, 6);
+
+/// GIT_CHECKOUT_SAFE. 0 is the dry run before.
+constexpr unsigned safeCheckout = isSince(1, 9) ? 0 : 1;
+
+/// An empty git_status_options has the threshold of renames that its function of libgit2 sets.
+constexpr bool setsRenameThreshold = isSince(1, 4);
+
+/// The code with which a repository of SHA-256 objects is refused.
+constexpr int refusalOfSha256 = isSince(1, 9) ? GIT_EINVALID : GIT_ERROR;
+/// The code with which a repository with extensions.worktreeConfig is refused, or 0.
+constexpr int refusalOfWorktreeConfig = isSince(1, 8) ? GIT_OK : GIT_ERROR;
+
+/// safe.directory is honoured where it is "*".
+constexpr bool trustsStar = isSince(1, 6);
+/// Another's repository is refused in the same way where safe.directory is not set at all.
+constexpr bool needsNoSafeDirectory = isSince(1, 6);
+/// What follows the path of another's repository in the text of its refusal.
+constexpr std::string_view endOfOwnedPath = isSince(1, 9) ? "" : "/";
+
+/// What is cut from the ends of the name of a person, besides white space.
+constexpr std::string_view noiseOfNames = isSince(1, 9) ? ",:;" : ".,:;";
+
+/// Between "could not find repository " and the folder.
+constexpr std::string_view whereNoRepositoryIs = isSince(1, 9) ? "at" : "from";
+/// Part of what is said of an address whose scheme nobody knows.
+inline std::string refusalOfScheme(const std::string &address)
+{
+    return isSince(1, 9) ? "invalid argument: 'port'" : address;
+}
+
+/// How it is told that an ssh server has had enough of keys.
+constexpr std::string_view endOfSshTries =
+    isSince(1, 9) ? "Failed getting response"
+                  : "Failed to retrieve list of SSH authentication methods";
+/// A missing ssh agent is told at the first request for credentials. Later releases ask again until
+/// the server has had enough.
+constexpr bool tellsOfMissingAgent = !isSince(1, 9);
+
+/// Whether libgit2 tells of no failure: without one there is no record, or one that says so.
+inline bool isSilent()
+{
+    const git_error *const record = git_error_last();
+    return record == nullptr || (isSince(1, 8) && record->klass == GIT_ERROR_NONE &&
+                                 std::string_view(record->message) == "no error");
+}
+
+} // namespace vclink::test::libgit2Release
