@@ -13,6 +13,7 @@ import sandbox
 
 PRESET = "mutation"
 ROOMS = ("error", "util", "options", "main")
+FAULTS = "tests/fault/vclink_fault_libgit2_tests"
 # Times that a test may take, of what it took when it was recorded: the machine may be busy.
 PATIENCE = 6
 START_SECONDS = 30
@@ -135,10 +136,11 @@ class Workplace:
                 path.unlink()
 
     def _find_programs(self):
-        """The programs with fast tests: those of the layers, but the one of the shared library."""
+        """The programs with fast tests: those of the layers, but the one of the shared library, and
+        the one that lets each call of libgit2 fail."""
         targets = _call(["ninja", "-C", self.build, "-t", "targets", "all"], self.tree)
-        folders = "|".join(ROOMS)
-        found = re.findall(rf"^(tests/(?:{folders})/vclink_\w+_tests): CXX_EX", targets, re.M)
+        names = rf"tests/(?:{'|'.join(ROOMS)})/vclink_\w+_tests|{FAULTS}"
+        found = re.findall(rf"^({names}): CXX_EX", targets, re.M)
         return sorted(name for name in found if not name.endswith("exported_tests"))
 
     def _keep_objects(self):

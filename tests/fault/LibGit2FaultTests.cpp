@@ -38,6 +38,12 @@ std::string nameOf(const FaultSite &site)
            std::to_string(site.fault.code);
 }
 
+bool isRelease(const std::string &call)
+{
+    const std::string end = "_free";
+    return call.size() > end.size() && call.compare(call.size() - end.size(), end.size(), end) == 0;
+}
+
 class FailingLibGit2Call : public vclink::test::FaultTest
 {
   protected:
@@ -57,11 +63,33 @@ class FailingLibGit2Call : public vclink::test::FaultTest
         return sites;
     }
 
+    static auto callOf(const FaultSite &site, std::vector<std::string> &calls)
+    {
+        auto call = std::find(calls.begin(), calls.end(), site.fault.function);
+        for (std::size_t earlier = 1; earlier < site.fault.call; ++earlier)
+            call = std::find(std::next(call), calls.end(), site.fault.function);
+        return call;
+    }
+
+    /// Expects that what was released was so before its repository, and that no driver is left.
+    static void expectEnded(const std::vector<std::string> &steps)
+    {
+        const auto repository = std::find(steps.rbegin(), steps.rend(), "git_repository_free");
+        if (repository != steps.rend())
+        {
+            EXPECT_EQ(std::find_if(steps.rbegin(), repository, isRelease), repository);
+        }
+        EXPECT_EQ(std::count(steps.begin(), steps.end(), "git_merge_driver_register"),
+                  std::count(steps.begin(), steps.end(), "git_merge_driver_unregister"));
+    }
+
     void fail(const FaultSite &site)
     {
         SCOPED_TRACE(nameOf(site));
         const auto action = trial_.begin();
         std::string outcome;
+        std::vector<std::string> calls;
+        std::vector<std::string> steps;
         {
             const vclink::test::NothingLeft nothingLeft(environment().temporary());
             LibGit2Recorder recorder(LibGit2Recorder::InCallbacks::Followed);
@@ -69,11 +97,20 @@ class FailingLibGit2Call : public vclink::test::FaultTest
             outcome = outcomeOf(action);
             EXPECT_EQ(recorder.openHandles(), std::vector<std::string>());
             EXPECT_EQ(recorder.starts(), 0);
+            calls = recorder.names();
+            steps = recorder.steps();
         }
         EXPECT_EQ(outcome, vclink::test::expectedOutcome(site, trial_.normalOutcome()));
         // The codes differ in what comes out, hardly in what is left.
         if (site.fault.code == codes.front() || vclink::test::wantsAllFaults())
+        {
             trial_.expectSound();
+            expectEnded(steps);
+            // A call that fails before libgit2 has done nothing.
+            if (site.fault.when == When::Before)
+                calls.erase(callOf(site, calls));
+            trial_.expectWrittenByThese(calls);
+        }
         if (vclink::test::isUnexamined(site.operation, site.fault.function))
         {
             EXPECT_EQ(trial_.gist(), trial_.normalGist());

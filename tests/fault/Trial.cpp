@@ -2,9 +2,11 @@
 #include "Trial.hpp"
 
 #include <algorithm>
+#include <array>
 #include <chrono>
 #include <cstdlib>
 #include <filesystem>
+#include <iterator>
 #include <utility>
 #include <vector>
 
@@ -65,6 +67,37 @@ bool isDone(const std::string &outcome)
     return begins(outcome, "done");
 }
 
+/// What writes more than objects, and what moves references.
+constexpr std::array callsThatWrite{"git_checkout_index", "git_checkout_tree",
+                                    "git_clone",          "git_config_set_string",
+                                    "git_index_write",    "git_merge",
+                                    "git_remote_fetch",   "git_remote_push",
+                                    "git_reset_default",  "git_repository_state_cleanup"};
+constexpr std::array callsThatMove{
+    "git_branch_create",        "git_branch_delete", "git_clone",       "git_commit_create",
+    "git_reference_set_target", "git_remote_fetch",  "git_remote_push", "git_repository_set_head"};
+
+template <class Names> bool isAnyOf(const Names &names, const std::string &call)
+{
+    return std::find(names.begin(), names.end(), call) != names.end();
+}
+
+bool isReference(const fs::path &file)
+{
+    const std::string text = file.string();
+    return text.find("/logs/") == std::string::npos &&
+           (text.find("/refs/") != std::string::npos || file.filename() == "packed-refs" ||
+            file.filename() == "HEAD");
+}
+
+RepositoryState::Entries referencesIn(const RepositoryState::Entries &files)
+{
+    RepositoryState::Entries references;
+    std::copy_if(files.begin(), files.end(), std::inserter(references, references.end()),
+                 [](const auto &file) { return isReference(file.first); });
+    return references;
+}
+
 } // namespace
 
 bool wantsAllFaults()
@@ -81,7 +114,9 @@ Trial::Trial(const Operation &operation, fs::path folder, const HermeticEnvironm
     operation_.prepare(repository_);
     dateIntoTheFuture(repository_);
     copyTree(folder_ / "subject", folder_ / "saved");
-    normalOutcome_ = outcomeOf(begin());
+    const Action action = begin();
+    beginning_ = files();
+    normalOutcome_ = outcomeOf(action);
     normalGist_ = gist();
 }
 
@@ -106,6 +141,43 @@ std::string Trial::gist() const
            line({"log", "--all", "--format=%s, %an, %T"}) +
            line({"log", "--all", "--merges", "--format=%s"}) + line({"rev-parse", "MERGE_HEAD"}) +
            GitRepository(home_).read(".gitconfig");
+}
+
+RepositoryState::Entries Trial::files() const
+{
+    auto entries = workingTreeOf(GitRepository(folder_ / "subject"));
+    for (auto entry = entries.begin(); entry != entries.end();)
+        entry = entry->first.find("/objects/") == std::string::npos ? std::next(entry)
+                                                                    : entries.erase(entry);
+    entries.emplace("the user's configuration", GitRepository(home_).read(".gitconfig"));
+    return entries;
+}
+
+void Trial::expectWrittenByThese(const std::vector<std::string> &calls) const
+{
+    const auto has = [&](const auto &names)
+    {
+        return std::any_of(calls.begin(), calls.end(),
+                           [&](const std::string &call) { return isAnyOf(names, call); });
+    };
+    if (has(callsThatMove))
+        return;
+    const auto left = files();
+    if (has(callsThatWrite))
+    {
+        EXPECT_EQ(referencesIn(left), referencesIn(beginning_));
+    }
+    else
+    {
+        EXPECT_EQ(left, beginning_);
+    }
+    // The library writes the other side's id once the merge is written.
+    const auto merge = std::find(calls.begin(), calls.end(), "git_merge");
+    if (std::find(merge, calls.end(), "git_oid_fmt") != calls.end())
+    {
+        EXPECT_EQ(repository_.line({"rev-parse", "MERGE_HEAD"}),
+                  repository_.line({"rev-parse", "topic"}));
+    }
 }
 
 void Trial::expectSound() const

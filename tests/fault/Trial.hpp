@@ -3,10 +3,12 @@
 
 #include <filesystem>
 #include <string>
+#include <vector>
 
 #include "Operation.hpp"
 #include "support/GitRepository.hpp"
 #include "support/HermeticEnvironment.hpp"
+#include "support/RepositoryState.hpp"
 
 namespace vclink::test
 {
@@ -50,6 +52,10 @@ class Trial
         return normalGist_;
     }
 
+    /// Expects after these calls of libgit2 what they allow: without one that writes, all is as it
+    /// began, to the byte; without one that moves a reference, all references are; and a merge that
+    /// is written and not committed is under way.
+    void expectWrittenByThese(const std::vector<std::string> &calls) const;
     /// Expects a repository in order, without a lock.
     void expectSound() const;
     /// Expects that the operation does its work when it is called again, at once or, where the
@@ -60,6 +66,8 @@ class Trial
     void closeWhatLibGit2Leaves() const;
 
   private:
+    /// Every file but objects, which nobody misses who has no reference to them.
+    RepositoryState::Entries files() const;
     /// Whether libgit2 forgets this lock where a call below it fails in the midst of writing:
     /// FETCH_HEAD's, MERGE_MSG's, and that of a file in conflict, which it leaves open besides.
     bool isLeftByLibGit2(const std::filesystem::path &file) const;
@@ -70,6 +78,7 @@ class Trial
     std::filesystem::path home_;
     GitRepository repository_;
     std::shared_ptr<git::GitAdapter> adapter_;
+    RepositoryState::Entries beginning_;
     std::string normalOutcome_;
     std::string normalGist_;
 };

@@ -78,7 +78,7 @@ class BranchCallsTest : public MergeTest
                                             {"git_tree_free", "git_tree_free"}});
     const Calls endOfTheLook_{"git_tree_free", "git_index_free"};
 
-    const LibGit2Failure injected_{GIT_ERROR, GIT_ERROR_OS, injectedText};
+    const Failure injected_{GIT_ERROR, GIT_ERROR_OS, injectedText};
     /// The records of git_checkout_tree, git_checkout_index and git_merge, in order, and their
     /// paths.
     std::vector<git_checkout_options> checkouts_;

@@ -16,9 +16,9 @@ namespace
 using testing::ElementsAre;
 using testing::IsEmpty;
 using vclink::git::BranchPointer;
+using vclink::test::Failure;
+using vclink::test::failureOf;
 using vclink::test::GitRepository;
-using vclink::test::LibGit2Failure;
-using vclink::test::libGit2FailureOf;
 using vclink::test::namesOf;
 using vclink::test::NothingChanges;
 using vclink::test::splitLines;
@@ -173,9 +173,9 @@ TEST_F(BranchLists, LeaveOutABranchThatIsBrokenAsGitDoes)
 TEST_F(BranchLists, FailWhereTheRepositoryCannotBeOpened)
 {
     repository_.remove(".git");
-    const LibGit2Failure failure = libGit2FailureOf([this] { local(); });
+    const Failure failure = failureOf([this] { local(); });
     EXPECT_EQ(failure.code, -3);
-    EXPECT_EQ(libGit2FailureOf([this] { remote(); }), failure);
+    EXPECT_EQ(failureOf([this] { remote(); }), failure);
 }
 
 TEST_F(BranchLists, AreOfOneWorkingCopyAndShownInEach)

@@ -14,8 +14,8 @@
 namespace
 {
 
-using vclink::test::LibGit2Failure;
-using vclink::test::libGit2FailureOf;
+using vclink::test::Failure;
+using vclink::test::failureOf;
 using vclink::test::NothingChanges;
 
 /// More than libgit2 keeps of one object when it is released.
@@ -34,11 +34,11 @@ class BranchRevisions : public vclink::test::BranchTest
         git_oid_tostr(digits.data(), digits.size(), &id);
         EXPECT_EQ(std::string(digits.data()), expected) << revision;
     }
-    void expectFailure(const std::string &revision, const LibGit2Failure &failure) const
+    void expectFailure(const std::string &revision, const Failure &failure) const
     {
         const NothingChanges nothing(repository_);
-        EXPECT_EQ(libGit2FailureOf([&] { branches().getRevision(revision); }), failure);
-        EXPECT_EQ(libGit2FailureOf([&] { branches().getRevisionId(revision); }), failure);
+        EXPECT_EQ(failureOf([&] { branches().getRevision(revision); }), failure);
+        EXPECT_EQ(failureOf([&] { branches().getRevisionId(revision); }), failure);
     }
 };
 
@@ -126,7 +126,7 @@ TEST_F(BranchRevisions, OfTheHeadFollowIt)
 TEST_F(BranchRevisions, OfTheHeadFailBeforeTheFirstCommit)
 {
     const NothingChanges nothing(repository_);
-    const LibGit2Failure failure = libGit2FailureOf([this] { branches().getHeadRevision(); });
+    const Failure failure = failureOf([this] { branches().getHeadRevision(); });
     EXPECT_EQ(failure.code, GIT_ENOTFOUND);
     EXPECT_THAT(failure.text, testing::HasSubstr("HEAD"));
 }
@@ -174,7 +174,7 @@ TEST_F(BranchRevisions, ThatMeanSeveralObjectsFail)
             common = id.substr(0, 4);
     }
     ASSERT_FALSE(common.empty());
-    EXPECT_EQ(libGit2FailureOf([&] { branches().getRevision(common); }).code, GIT_EAMBIGUOUS);
+    EXPECT_EQ(failureOf([&] { branches().getRevision(common); }).code, GIT_EAMBIGUOUS);
 }
 
 TEST_F(BranchRevisions, LeaveNoDescriptorOpen)

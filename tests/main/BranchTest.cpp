@@ -1,56 +1,22 @@
 // SPDX-License-Identifier: MIT
 #include "BranchTest.hpp"
 
-#include <ostream>
 #include <sstream>
-#include <tuple>
-#include <typeinfo>
-
-#include <gtest/gtest.h>
 
 #include "fl/i18n/MessageCatalog.hpp"
 #include "fl/i18n/VkLocale.hpp"
 #include "support/text.hpp"
-#include "vclink/git/LibGit2Exception.hpp"
 #include "vclink/git/messageIdentifiers.hpp"
 
 namespace vclink::test
 {
-
-bool operator==(const LibGit2Failure &left, const LibGit2Failure &right)
-{
-    return std::tie(left.code, left.errorClass, left.text) ==
-           std::tie(right.code, right.errorClass, right.text);
-}
-
-std::ostream &operator<<(std::ostream &stream, const LibGit2Failure &failure)
-{
-    return stream << failure.code << ", class " << failure.errorClass << ": " << failure.text;
-}
-
-LibGit2Failure libGit2FailureOf(const std::function<void()> &action)
-{
-    try
-    {
-        action();
-        ADD_FAILURE() << "no exception";
-    }
-    catch (const git::LibGit2Exception &exception)
-    {
-        const vclink::exception::SourceControlException &base = exception;
-        EXPECT_EQ(typeid(base), typeid(git::LibGit2Exception));
-        const git::GitError &error = exception.getError();
-        return {error.getCode(), error.getErrorClass(), asUtf8(error.getMessage())};
-    }
-    return {};
-}
 
 std::string textOf(const resource_core::BaseMsgID &message)
 {
     return asUtf8(fl::i18n::MessageCatalog::get_message(message, fl::i18n::VkLocale::global()));
 }
 
-std::string textOf(const LibGit2Failure &failure)
+std::string textOf(const Failure &failure)
 {
     return textOf(
         shared_vclink::git::LibGit2Error(failure.code, failure.errorClass, asUtf16(failure.text)));

@@ -1,39 +1,29 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
-#include <functional>
-#include <iosfwd>
 #include <memory>
 #include <string>
 #include <vector>
 
 #include "AdapterTest.hpp"
 #include "resource_core/BaseMsgID.hpp"
+#include "support/Failure.hpp"
 #include "support/RepositoryState.hpp"
 #include "vclink/git/BranchManager.hpp"
 
 namespace vclink::test
 {
 
-/// What a LibGit2Exception tells.
-struct LibGit2Failure
+using LibGit2Failure = Failure;
+inline Failure libGit2FailureOf(const std::function<void()> &action)
 {
-    int code = 0;
-    int errorClass = 0;
-    std::string text;
-};
-
-bool operator==(const LibGit2Failure &left, const LibGit2Failure &right);
-std::ostream &operator<<(std::ostream &stream, const LibGit2Failure &failure);
-
-/// The LibGit2Exception that `action` raises; the test fails when it raises none, or one of another
-/// class.
-LibGit2Failure libGit2FailureOf(const std::function<void()> &action);
+    return failureOf(action);
+}
 
 /// A message's text in the language of the process.
 std::string textOf(const resource_core::BaseMsgID &message);
 /// The text of a LibGit2Exception with this failure.
-std::string textOf(const LibGit2Failure &failure);
+std::string textOf(const Failure &failure);
 
 /// Base of the fixtures whose tests run a branch manager, each on an adapter of its own, over a
 /// repository that has an identity in its configuration and nothing else.

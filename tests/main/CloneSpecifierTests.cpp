@@ -23,7 +23,6 @@ namespace
 namespace git = vclink::git;
 using vclink::test::asUtf8;
 using vclink::test::GitRepository;
-using vclink::test::libGit2FailureOf;
 using vclink::test::Naming;
 using vclink::test::WorkingFolder;
 
@@ -43,9 +42,9 @@ class CloneSpecifier : public vclink::test::CloneTest
         return GitRepository(folder() / name);
     }
     /// Nothing is made then.
-    vclink::test::LibGit2Failure failureOf(const std::string &specifier) const
+    vclink::test::Failure failureOf(const std::string &specifier) const
     {
-        auto failure = libGit2FailureOf([&] { generate(specifier, clone_.path()); });
+        auto failure = vclink::test::failureOf([&] { generate(specifier, clone_.path()); });
         EXPECT_FALSE(std::filesystem::exists(clone_.path())) << specifier;
         return failure;
     }
@@ -152,7 +151,7 @@ TEST_F(CloneTarget, IsAFailureWhenItIsNotEmpty)
 {
     std::filesystem::create_directory(clone_.path());
     clone_.write("mine", "x");
-    const auto failure = libGit2FailureOf([this] { generate(); });
+    const auto failure = vclink::test::failureOf([this] { generate(); });
     EXPECT_EQ(failure.code, GIT_EEXISTS);
     EXPECT_EQ(failure.errorClass, GIT_ERROR_INVALID);
     EXPECT_EQ(failure.text,
@@ -164,14 +163,14 @@ TEST_F(CloneTarget, IsAFailureWhenItIsNotEmpty)
 TEST_F(CloneTarget, IsAFailureWhenItIsAFile)
 {
     GitRepository(folder().path()).write("clone", "x");
-    EXPECT_EQ(libGit2FailureOf([this] { generate(); }).code, GIT_EEXISTS);
+    EXPECT_EQ(vclink::test::failureOf([this] { generate(); }).code, GIT_EEXISTS);
     EXPECT_EQ(GitRepository(folder().path()).read("clone"), "x");
 }
 
 TEST_F(CloneTarget, ThatWasThereAndEmptyStaysSoAfterAFailure)
 {
     std::filesystem::create_directory(clone_.path());
-    libGit2FailureOf([this] { generate(folder() / "missing", clone_.path()); });
+    vclink::test::failureOf([this] { generate(folder() / "missing", clone_.path()); });
     ASSERT_TRUE(std::filesystem::is_directory(clone_.path()));
     EXPECT_THAT(names(), testing::IsEmpty());
     generate();
@@ -180,7 +179,7 @@ TEST_F(CloneTarget, ThatWasThereAndEmptyStaysSoAfterAFailure)
 
 TEST_F(CloneTarget, WithAnEmptyNameFails)
 {
-    EXPECT_LT(libGit2FailureOf([this] { generate(nameOf(server_), ""); }).code, 0);
+    EXPECT_LT(vclink::test::failureOf([this] { generate(nameOf(server_), ""); }).code, 0);
 }
 
 TEST_F(CloneTarget, ThatMayNotBeWrittenFails)

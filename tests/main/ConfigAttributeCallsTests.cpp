@@ -23,11 +23,7 @@ namespace
 namespace git = vclink::git;
 using testing::ElementsAre;
 using vclink::test::asPath;
-using vclink::test::LibGit2Failure;
-using vclink::test::libGit2FailureOf;
 using vclink::test::LibGit2Recorder;
-
-const LibGit2Failure injected{GIT_ERROR, GIT_ERROR_OS, "injected"};
 
 class AttributeCalls : public vclink::test::BranchTest
 {
@@ -50,13 +46,6 @@ TEST_F(AttributeCalls, OfTheCreationFlushARepositoryThatIsReleasedAtOnce)
                                            "git_repository_free"));
 }
 
-TEST_F(AttributeCalls, OfTheFlushMayFail)
-{
-    LibGit2Recorder calls;
-    calls.fail({{"git_attr_cache_flush", GIT_ERROR}});
-    EXPECT_EQ(serialize(create()->getAttribute(asPath("a"), u"x")), "x=raw");
-}
-
 TEST_F(AttributeCalls, OfAQueryAreTheseInOrder)
 {
     const auto attributes = create();
@@ -71,26 +60,6 @@ TEST_F(AttributeCalls, OfAQueryAreTheseInOrder)
     std::vector<std::string> ofBoth = ofOne;
     ofBoth.insert(ofBoth.end(), ofOne.begin(), ofOne.end());
     EXPECT_EQ(calls.names(), ofBoth);
-}
-
-TEST_F(AttributeCalls, OfAQueryAreRaisedWhenTheyFail)
-{
-    const auto attributes = create();
-    for (const std::string name : {"git_repository_open_ext", "git_attr_get"})
-    {
-        LibGit2Recorder calls;
-        calls.fail({{name, GIT_ERROR}});
-        EXPECT_EQ(libGit2FailureOf([&] { attributes->getAttribute(asPath("a"), u"x"); }), injected)
-            << name;
-        EXPECT_EQ(calls.steps().back(), name == "git_attr_get" ? "git_repository_free" : name);
-    }
-}
-
-TEST_F(AttributeCalls, OfTheCreationAreRaisedWhenTheRepositoryCannotBeOpened)
-{
-    LibGit2Recorder calls;
-    calls.fail({{"git_repository_open_ext", GIT_ERROR}});
-    EXPECT_EQ(libGit2FailureOf([&] { create(); }), injected);
 }
 
 TEST_F(AttributeCalls, ThatGiveAnUnknownStateAreRaisedWithTheRawValue)
@@ -134,64 +103,16 @@ TEST_F(ConfigCalls, OfALifeAreTheseInOrder)
                                            "git_merge_driver_unregister", "git_libgit2_shutdown"));
 }
 
-TEST_F(ConfigCalls, OfTheConstructorAreRaisedAndWhatWasOpenedIsReleased)
-{
-    {
-        LibGit2Recorder calls;
-        calls.fail({{"git_config_open_default", GIT_ERROR}});
-        EXPECT_EQ(libGit2FailureOf([] { git::GitConfig config; }), injected);
-        EXPECT_THAT(calls.steps(),
-                    ElementsAre("git_libgit2_init", "git_merge_driver_register",
-                                "git_config_open_default", "git_merge_driver_unregister",
-                                "git_libgit2_shutdown"));
-    }
-    LibGit2Recorder calls;
-    calls.fail({{"git_config_open_global", GIT_ERROR}});
-    EXPECT_EQ(libGit2FailureOf([] { git::GitConfig config; }), injected);
-    EXPECT_THAT(calls.steps(),
-                ElementsAre("git_libgit2_init", "git_merge_driver_register",
-                            "git_config_open_default", "git_config_open_global", "git_config_free",
-                            "git_merge_driver_unregister", "git_libgit2_shutdown"));
-}
-
-TEST_F(ConfigCalls, OfAReadAreOneAndDroppedWhenTheyFail)
+TEST_F(ConfigCalls, OfAWriteAReadAndThePathAreOneEach)
 {
     const vclink::test::InstallPath installation("/opt/host");
     git::GitConfig config;
+    LibGit2Recorder calls;
     config.writeDiffTool();
-    LibGit2Recorder calls;
     EXPECT_NE(config.readDiffTool(), std::nullopt);
-    EXPECT_THAT(calls.steps(), ElementsAre("git_config_get_string_buf"));
-    for (const int code : {GIT_ERROR, GIT_ENOTFOUND, GIT_EUSER})
-    {
-        calls.fail({{"git_config_get_string_buf", code}});
-        EXPECT_EQ(config.readDiffTool(), std::nullopt);
-        EXPECT_EQ(config.readMergeTool(), std::nullopt);
-        EXPECT_EQ(config.readAutoMergeDriver(), std::nullopt);
-    }
-}
-
-TEST_F(ConfigCalls, OfAWriteReadNothingFirstAndAreRaisedWhenTheyFail)
-{
-    git::GitConfig config;
-    LibGit2Recorder calls;
-    config.writeMergeTool();
-    EXPECT_THAT(calls.steps(), ElementsAre("git_config_set_string"));
-    calls.fail({{"git_config_set_string", GIT_ERROR}});
-    EXPECT_EQ(libGit2FailureOf([&] { config.writeMergeTool(); }), injected);
-    EXPECT_EQ(libGit2FailureOf([&] { config.writeDiffTool(); }), injected);
-    EXPECT_EQ(libGit2FailureOf([&] { config.writeAutoMergeDriver(); }), injected);
-}
-
-TEST_F(ConfigCalls, OfThePathAreOneAndDroppedWhenTheyFail)
-{
-    git::GitConfig config;
-    config.writeMergeTool();
-    LibGit2Recorder calls;
     EXPECT_NE(config.globalFilePath(), std::nullopt);
-    EXPECT_THAT(calls.steps(), ElementsAre("git_config_find_global"));
-    calls.fail({{"git_config_find_global", GIT_ERROR}});
-    EXPECT_EQ(config.globalFilePath(), std::nullopt);
+    EXPECT_THAT(calls.steps(), ElementsAre("git_config_set_string", "git_config_get_string_buf",
+                                           "git_config_find_global"));
 }
 
 } // namespace

@@ -17,8 +17,8 @@ namespace
 using testing::HasSubstr;
 using testing::IsEmpty;
 using vclink::git::BranchParameters;
-using vclink::test::LibGit2Failure;
-using vclink::test::libGit2FailureOf;
+using vclink::test::Failure;
+using vclink::test::failureOf;
 using vclink::test::NothingChanges;
 using vclink::test::RepositoryState;
 using vclink::test::splitLines;
@@ -44,15 +44,15 @@ class BranchChangeTest : public vclink::test::BranchTest
     {
         branches().deleteBranch(name);
     }
-    LibGit2Failure failureOfCreate(const std::string &name, const std::string &startPoint) const
+    Failure failureOfCreate(const std::string &name, const std::string &startPoint) const
     {
         const NothingChanges nothing(repository_);
-        return libGit2FailureOf([&] { create(name, startPoint); });
+        return failureOf([&] { create(name, startPoint); });
     }
-    LibGit2Failure failureOfDelete(const std::string &name) const
+    Failure failureOfDelete(const std::string &name) const
     {
         const NothingChanges nothing(repository_);
-        return libGit2FailureOf([&] { drop(name); });
+        return failureOf([&] { drop(name); });
     }
 };
 
@@ -104,7 +104,7 @@ TEST_F(CreateBranch, StartsAtNoAnnotatedTag)
 {
     repository_.git(
         {"-c", "user.name=x", "-c", "user.email=x@y", "tag", "-a", "-m", "message", "annotated"});
-    const LibGit2Failure failure = failureOfCreate("topic", "annotated");
+    const Failure failure = failureOfCreate("topic", "annotated");
     EXPECT_EQ(failure.code, GIT_ENOTFOUND);
     EXPECT_EQ(failure.text, "the requested type does not match the type in the ODB");
 }
@@ -117,7 +117,7 @@ TEST_F(CreateBranch, StartsAtNoTree)
 
 TEST_F(CreateBranch, FailsWithAnUnknownStartPointBeforeItTouchesAReference)
 {
-    const LibGit2Failure failure = failureOfCreate("topic", "missing");
+    const Failure failure = failureOfCreate("topic", "missing");
     EXPECT_EQ(failure.code, GIT_ENOTFOUND);
     EXPECT_EQ(failure.text, "no reference found for shorthand 'missing'");
     // The start point comes first, also where the name would be refused.
@@ -127,7 +127,7 @@ TEST_F(CreateBranch, FailsWithAnUnknownStartPointBeforeItTouchesAReference)
 TEST_F(CreateBranch, FailsForANameThatExists)
 {
     repository_.git({"branch", "topic", "first"});
-    const LibGit2Failure failure = failureOfCreate("topic", "main");
+    const Failure failure = failureOfCreate("topic", "main");
     EXPECT_EQ(failure.code, GIT_EEXISTS);
     EXPECT_THAT(failure.text, HasSubstr("already exists"));
     EXPECT_EQ(failureOfCreate("main", "first").code, GIT_EEXISTS) << "the current branch";
@@ -212,7 +212,7 @@ TEST_F(DeleteBranch, RemovesAPackedBranchWithItsSettingsAndItsReflog)
 
 TEST_F(DeleteBranch, FailsForTheCurrentBranch)
 {
-    const LibGit2Failure failure = failureOfDelete("main");
+    const Failure failure = failureOfDelete("main");
     EXPECT_EQ(failure.code, GIT_ERROR);
     EXPECT_EQ(failure.text, "cannot delete branch 'refs/heads/main' as it is the current HEAD of "
                             "the repository.");
@@ -221,7 +221,7 @@ TEST_F(DeleteBranch, FailsForTheCurrentBranch)
 TEST_F(DeleteBranch, FailsForTheBranchOfALinkedWorktree)
 {
     repository_.git({"worktree", "add", "--quiet", "-b", "second", (folder() / "linked").string()});
-    const LibGit2Failure failure = failureOfDelete("second");
+    const Failure failure = failureOfDelete("second");
     EXPECT_EQ(failure.code, GIT_ERROR);
     EXPECT_THAT(failure.text, HasSubstr("refs/heads/second"));
 }

@@ -22,8 +22,8 @@ namespace
 
 using vclink::git::BasicBranchManager;
 using vclink::git::BranchManager;
-using vclink::test::LibGit2Failure;
-using vclink::test::libGit2FailureOf;
+using vclink::test::Failure;
+using vclink::test::failureOf;
 using vclink::test::NothingChanges;
 using vclink::test::slotOf;
 
@@ -50,7 +50,7 @@ TEST_F(CurrentBranch, HasItsShortName)
 TEST_F(CurrentBranch, IsNoneBeforeTheFirstCommit)
 {
     const NothingChanges nothing(repository_);
-    const LibGit2Failure failure = libGit2FailureOf([this] { name(); });
+    const Failure failure = failureOf([this] { name(); });
     EXPECT_EQ(failure.code, GIT_EUNBORNBRANCH);
     EXPECT_EQ(failure.text, "reference 'refs/heads/main' not found");
 }
@@ -60,7 +60,7 @@ TEST_F(CurrentBranch, IsNoneOnADetachedHead)
     repository_.commitAll("first");
     repository_.git({"checkout", "--quiet", "--detach"});
     const NothingChanges nothing(repository_);
-    const LibGit2Failure failure = libGit2FailureOf([this] { name(); });
+    const Failure failure = failureOf([this] { name(); });
     EXPECT_EQ(failure.code, GIT_ERROR);
     EXPECT_EQ(failure.text, "reference 'HEAD' is neither a local nor a remote branch.");
 }
@@ -68,7 +68,7 @@ TEST_F(CurrentBranch, IsNoneOnADetachedHead)
 TEST_F(CurrentBranch, IsNoneWhereTheRepositoryCannotBeOpened)
 {
     repository_.remove(".git");
-    EXPECT_EQ(libGit2FailureOf([this] { name(); }).code, GIT_ENOTFOUND);
+    EXPECT_EQ(failureOf([this] { name(); }).code, GIT_ENOTFOUND);
 }
 
 TEST_F(CurrentBranch, FollowsWhatOthersDo)

@@ -30,8 +30,8 @@ namespace git = vclink::git;
 using vclink::test::asPath;
 using vclink::test::asUtf16;
 using vclink::test::asUtf8;
-using vclink::test::LibGit2Failure;
-using vclink::test::libGit2FailureOf;
+using vclink::test::Failure;
+using vclink::test::failureOf;
 using vclink::test::LibGit2Recorder;
 
 /// Functions whose text is never shown: they give no code, the library does not look at it, or they
@@ -94,7 +94,7 @@ class EarlierTexts : public vclink::test::RemoteTest
         for (const auto &silence : silences)
         {
             silence.begin();
-            EXPECT_EQ(libGit2FailureOf(silence.operation), (LibGit2Failure{GIT_ERROR, 0, ""}))
+            EXPECT_EQ(failureOf(silence.operation), (Failure{GIT_ERROR, 0, ""}))
                 << silence.function;
         }
     }
@@ -220,7 +220,7 @@ TEST_F(EarlierTexts, AreNotThoseOfAMergeThatFails)
         EXPECT_EQ(asUtf8(exception.GetUnicodeMessageTxt()).find(vclink::test::earlierText),
                   std::string::npos);
         EXPECT_NE(asUtf8(exception.GetUnicodeMessageTxt())
-                      .find(vclink::test::textOf(LibGit2Failure{GIT_ERROR, 0, ""})),
+                      .find(vclink::test::textOf(Failure{GIT_ERROR, 0, ""})),
                   std::string::npos);
     }
 }

@@ -24,7 +24,7 @@ using testing::ElementsAre;
 using testing::HasSubstr;
 using testing::IsEmpty;
 using vclink::test::cancelAt;
-using vclink::test::LibGit2Failure;
+using vclink::test::Failure;
 using vclink::test::LogCapture;
 using vclink::test::NothingChanges;
 using vclink::test::ProgressCall;
@@ -50,7 +50,7 @@ class FastForward : public vclink::test::MergeTest
         repository_.git({"checkout", "--quiet", "main"});
     }
 
-    void expectRefused(const LibGit2Failure &failure) const
+    void expectRefused(const Failure &failure) const
     {
         const NothingChanges nothing(repository_);
         EXPECT_EQ(failureOfMerge("topic"), textOf(failure));
@@ -61,8 +61,7 @@ class FastForward : public vclink::test::MergeTest
     }
 };
 
-const LibGit2Failure oneFileInTheWay{GIT_ECONFLICT, GIT_ERROR_CHECKOUT,
-                                     "1 conflict prevents checkout"};
+const Failure oneFileInTheWay{GIT_ECONFLICT, GIT_ERROR_CHECKOUT, "1 conflict prevents checkout"};
 
 TEST_F(FastForward, MovesTheBranchTheIndexAndTheFilesAndMakesNoCommit)
 {

@@ -20,7 +20,7 @@ using testing::ElementsAre;
 using testing::HasSubstr;
 using testing::IsEmpty;
 using testing::StartsWith;
-using vclink::test::libGit2FailureOf;
+using vclink::test::failureOf;
 using vclink::test::LogCapture;
 using vclink::test::Naming;
 using vclink::test::stateOf;
@@ -147,7 +147,7 @@ TEST_P(Fetch, OfAnEmptyListTakesWhatIsConfigured)
 TEST_P(Fetch, RefusesARefspecThatIsNone)
 {
     const vclink::test::NothingChanges nothing(repository_);
-    EXPECT_LT(libGit2FailureOf([this] { fetch({"refs/heads/*:refs/own/main"}); }).code, 0);
+    EXPECT_LT(failureOf([this] { fetch({"refs/heads/*:refs/own/main"}); }).code, 0);
 }
 
 TEST_P(Fetch, OfNothingNewChangesNothing)
@@ -217,7 +217,7 @@ TEST_P(Fetch, ThatFailsLeavesTheRepositoryAsItWas)
     publish("file", "changed\n");
     repository_.write(".git/refs/remotes/origin/main.lock", "");
     const auto before = stateOf(repository_);
-    EXPECT_THAT(libGit2FailureOf([this] { fetch(); }).text, HasSubstr("main.lock"));
+    EXPECT_THAT(failureOf([this] { fetch(); }).text, HasSubstr("main.lock"));
     EXPECT_EQ(stateOf(repository_), before);
     repository_.remove(".git/refs/remotes/origin/main.lock");
     expectAsGitDoes();
@@ -234,7 +234,7 @@ TEST_P(Fetch, LeavesNoDescriptorOpen)
     if (GetParam() == Naming::FileUrl)
         vclink::test::expectCancelled([this] { fetch(); });
     repository_.git({"remote", "set-url", "origin", (folder() / "nowhere").string()});
-    libGit2FailureOf([this] { fetch(); });
+    failureOf([this] { fetch(); });
 }
 
 INSTANTIATE_TEST_SUITE_P(Locally, Fetch, testing::Values(Naming::PlainPath, Naming::FileUrl));

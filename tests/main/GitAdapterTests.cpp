@@ -12,10 +12,10 @@
 #include "AdapterTest.hpp"
 #include "TestOptionsFactory.hpp"
 #include "support/Descriptors.hpp"
+#include "support/Failure.hpp"
 #include "support/LibGit2Session.hpp"
 #include "support/text.hpp"
 #include "vclink/exception/SourceControlException.hpp"
-#include "vclink/git/LibGit2Exception.hpp"
 
 namespace
 {
@@ -23,10 +23,10 @@ namespace
 using vclink::ApplicationInteractor;
 using vclink::exception::SourceControlException;
 using vclink::git::GitAdapter;
-using vclink::git::LibGit2Exception;
 using vclink::test::asPath;
 using vclink::test::asUtf8;
 using vclink::test::countLibGit2Starts;
+using vclink::test::failureOf;
 using vclink::test::TestOptionsFactory;
 
 class GitAdapterTest : public vclink::test::AdapterTest
@@ -89,15 +89,7 @@ TEST_F(GitAdapterTest, RaisesWhereItsRepositoryCannotBeOpened)
 {
     const auto adapter = makeAdapter(folder() / "missing");
     const vclink::test::NoDescriptorLeak noLeak;
-    try
-    {
-        static_cast<void>(adapter->getRepository());
-        FAIL() << "no exception";
-    }
-    catch (const LibGit2Exception &exception)
-    {
-        EXPECT_EQ(exception.getError().getCode(), GIT_ENOTFOUND);
-    }
+    EXPECT_EQ(failureOf([&] { static_cast<void>(adapter->getRepository()); }).code, GIT_ENOTFOUND);
 }
 
 TEST_F(GitAdapterTest, SharesTheFactoryAndTheInteractor)

@@ -27,8 +27,8 @@ using vclink::git::GitAttributesImpl;
 using vclink::git::serialize;
 using vclink::test::asPath;
 using vclink::test::asUtf16;
+using vclink::test::failureOf;
 using vclink::test::GitRepository;
-using vclink::test::libGit2FailureOf;
 
 class GitAttributesTest : public vclink::test::BranchTest
 {
@@ -270,9 +270,8 @@ TEST_F(GitAttributesTest, FailsWhereTheRepositoryCannotBeOpened)
 {
     const auto attributes = GitAttributes::create(*adapter_);
     repository_.remove(".git");
-    EXPECT_EQ(libGit2FailureOf([&] { attributes->getAttribute(asPath("a"), u"x"); }).code,
-              GIT_ENOTFOUND);
-    EXPECT_EQ(libGit2FailureOf([&] { static_cast<void>(GitAttributes::create(*adapter_)); }).code,
+    EXPECT_EQ(failureOf([&] { attributes->getAttribute(asPath("a"), u"x"); }).code, GIT_ENOTFOUND);
+    EXPECT_EQ(failureOf([&] { static_cast<void>(GitAttributes::create(*adapter_)); }).code,
               GIT_ENOTFOUND);
 }
 

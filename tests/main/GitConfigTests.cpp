@@ -10,6 +10,7 @@
 
 #include "GitConfigTest.hpp"
 #include "support/Descriptors.hpp"
+#include "support/Failure.hpp"
 #include "support/LogCapture.hpp"
 #include "support/UnprivilegedUser.hpp"
 #include "support/text.hpp"
@@ -23,6 +24,7 @@ using testing::IsEmpty;
 using vclink::git::GitConfig;
 using vclink::test::asBytes;
 using vclink::test::asUtf8;
+using vclink::test::failureOf;
 using vclink::test::runAsUnprivilegedUser;
 using vclink::test::shown;
 
@@ -246,15 +248,7 @@ TEST_F(GitConfigFile, MayBeALink)
 TEST_F(GitConfigFile, ThatIsBrokenIsRefusedAtOnceAndStays)
 {
     writeFile(global(), "[broken\n");
-    try
-    {
-        GitConfig config;
-        FAIL() << "no exception";
-    }
-    catch (const vclink::git::LibGit2Exception &exception)
-    {
-        EXPECT_EQ(exception.getError().getErrorClass(), GIT_ERROR_CONFIG);
-    }
+    EXPECT_EQ(failureOf([&] { GitConfig config; }).errorClass, GIT_ERROR_CONFIG);
     EXPECT_EQ(read(global()), "[broken\n");
 }
 
@@ -263,7 +257,7 @@ TEST_F(GitConfigFile, ThatIsLockedIsNotWritten)
     writeFile(global(), "[user]\n\tname = Somebody\n");
     writeFile(global().string() + ".lock", "");
     GitConfig config;
-    const auto failure = vclink::test::libGit2FailureOf([&] { config.writeDiffTool(); });
+    const auto failure = vclink::test::failureOf([&] { config.writeDiffTool(); });
     EXPECT_EQ(failure.code, GIT_ELOCKED);
     EXPECT_EQ(read(global()), "[user]\n\tname = Somebody\n");
     EXPECT_EQ(config.readDiffTool(), std::nullopt);

@@ -26,8 +26,8 @@ namespace
 namespace git = vclink::git;
 using testing::ElementsAre;
 using testing::IsEmpty;
-using vclink::test::LibGit2Failure;
-using vclink::test::libGit2FailureOf;
+using vclink::test::Failure;
+using vclink::test::failureOf;
 using vclink::test::LogCapture;
 using vclink::test::Naming;
 using vclink::test::NothingChanges;
@@ -102,19 +102,19 @@ TEST_F(GitRemoteTest, IsMadeWithoutALookAtTheRepository)
 {
     const auto adapter = makeAdapter(folder() / "missing");
     const auto remote = git::GitRemote::create("", *adapter);
-    EXPECT_EQ(libGit2FailureOf([&] { remote->fetch({}); }).code, GIT_ENOTFOUND);
-    EXPECT_EQ(libGit2FailureOf([&] { remote->push({}); }).code, GIT_ENOTFOUND);
-    EXPECT_EQ(libGit2FailureOf([&] { remote->getRemoteHeads(); }).code, GIT_ENOTFOUND);
+    EXPECT_EQ(failureOf([&] { remote->fetch({}); }).code, GIT_ENOTFOUND);
+    EXPECT_EQ(failureOf([&] { remote->push({}); }).code, GIT_ENOTFOUND);
+    EXPECT_EQ(failureOf([&] { remote->getRemoteHeads(); }).code, GIT_ENOTFOUND);
 }
 
 TEST_F(GitRemoteTest, ThatTheRepositoryDoesNotKnowFailsAtItsFirstOperation)
 {
     const auto unknown = git::GitRemote::create("nobody", *adapter_);
-    const LibGit2Failure failure{GIT_ENOTFOUND, GIT_ERROR_CONFIG, "remote 'nobody' does not exist"};
+    const Failure failure{GIT_ENOTFOUND, GIT_ERROR_CONFIG, "remote 'nobody' does not exist"};
     const NothingChanges nothing(repository_);
-    EXPECT_EQ(libGit2FailureOf([&] { unknown->fetch({}); }), failure);
-    EXPECT_EQ(libGit2FailureOf([&] { unknown->push({}); }), failure);
-    EXPECT_EQ(libGit2FailureOf([&] { unknown->getRemoteHeads(); }), failure);
+    EXPECT_EQ(failureOf([&] { unknown->fetch({}); }), failure);
+    EXPECT_EQ(failureOf([&] { unknown->push({}); }), failure);
+    EXPECT_EQ(failureOf([&] { unknown->getRemoteHeads(); }), failure);
 }
 
 TEST_F(GitRemoteTest, OfAnImpossibleNameFails)
@@ -122,8 +122,7 @@ TEST_F(GitRemoteTest, OfAnImpossibleNameFails)
     for (const std::string name : {"", "a b", "..", "-~"})
     {
         const auto impossible = git::GitRemote::create(name, *adapter_);
-        EXPECT_EQ(libGit2FailureOf([&] { impossible->getRemoteHeads(); }).code, GIT_EINVALIDSPEC)
-            << name;
+        EXPECT_EQ(failureOf([&] { impossible->getRemoteHeads(); }).code, GIT_EINVALIDSPEC) << name;
     }
 }
 
@@ -141,11 +140,11 @@ TEST_F(GitRemoteTest, KeepsACopyOfItsName)
 TEST_F(GitRemoteTest, IsLookedUpAnewAtEachOperation)
 {
     const auto later = git::GitRemote::create("later", *adapter_);
-    EXPECT_EQ(libGit2FailureOf([&] { later->getRemoteHeads(); }).code, GIT_ENOTFOUND);
+    EXPECT_EQ(failureOf([&] { later->getRemoteHeads(); }).code, GIT_ENOTFOUND);
     repository_.git({"remote", "add", "later", nameOf(server_)});
     EXPECT_EQ(later->getRemoteHeads().size(), 2U);
     repository_.git({"remote", "set-url", "later", (folder() / "nowhere").string()});
-    EXPECT_NE(libGit2FailureOf([&] { later->getRemoteHeads(); }).code, 0);
+    EXPECT_NE(failureOf([&] { later->getRemoteHeads(); }).code, 0);
 }
 
 TEST_F(GitRemoteTest, ThatCannotBeReachedFailsAndChangesNothing)
@@ -153,9 +152,8 @@ TEST_F(GitRemoteTest, ThatCannotBeReachedFailsAndChangesNothing)
     repository_.git({"remote", "set-url", "origin", (folder() / "nowhere").string()});
     const NothingChanges nothing(repository_);
     const vclink::test::NoDescriptorLeak noLeak;
-    for (const auto &failure :
-         {libGit2FailureOf([&] { fetch(); }), libGit2FailureOf([&] { push({"main"}); }),
-          libGit2FailureOf([&] { remote().getRemoteHeads(); })})
+    for (const auto &failure : {failureOf([&] { fetch(); }), failureOf([&] { push({"main"}); }),
+                                failureOf([&] { remote().getRemoteHeads(); })})
     {
         EXPECT_LT(failure.code, 0);
         EXPECT_NE(failure.text, "");
@@ -165,7 +163,7 @@ TEST_F(GitRemoteTest, ThatCannotBeReachedFailsAndChangesNothing)
 TEST_F(GitRemoteTest, WorksAfterAFailure)
 {
     repository_.git({"remote", "set-url", "origin", (folder() / "nowhere").string()});
-    libGit2FailureOf([&] { fetch(); });
+    failureOf([&] { fetch(); });
     repository_.git({"remote", "set-url", "origin", nameOf(server_)});
     EXPECT_NO_THROW(fetch());
     EXPECT_EQ(idOf("origin/main"), idOf("refs/remotes/origin/main"));

@@ -32,8 +32,8 @@ using testing::StartsWith;
 using vclink::test::asPath;
 using vclink::test::asUtf16;
 using vclink::test::countLibGit2Starts;
+using vclink::test::failureOf;
 using vclink::test::GitRepository;
-using vclink::test::libGit2FailureOf;
 using vclink::test::LogCapture;
 using vclink::test::Naming;
 using vclink::test::TestOptionsFactory;
@@ -224,8 +224,8 @@ TEST_P(Clone, LeavesNoDescriptorOpen)
     generate();
     const vclink::test::NoDescriptorLeak noLeak;
     generate(nameOf(server_), folder() / "second");
-    libGit2FailureOf([this] { generate(nameOf(server_), clone_.path()); });
-    libGit2FailureOf([this] { generate("/nowhere", folder() / "third"); });
+    failureOf([this] { generate(nameOf(server_), clone_.path()); });
+    failureOf([this] { generate("/nowhere", folder() / "third"); });
     interactor_->cancel();
     vclink::test::expectCancelled([this] { generate(nameOf(server_), folder() / "third"); });
 }

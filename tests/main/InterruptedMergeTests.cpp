@@ -22,9 +22,9 @@ namespace
 namespace fs = std::filesystem;
 using testing::HasSubstr;
 using testing::IsEmpty;
+using vclink::test::Failure;
+using vclink::test::failureOf;
 using vclink::test::indexStampOf;
-using vclink::test::LibGit2Failure;
-using vclink::test::libGit2FailureOf;
 using vclink::test::NothingChanges;
 using vclink::test::stateOf;
 
@@ -61,7 +61,7 @@ class InterruptedMerge : public vclink::test::MergeTest
                 if (number == call)
                     ::kill(::getpid(), SIGKILL);
             };
-            static_cast<void>(libGit2FailureOf([this] { merge("topic"); }));
+            static_cast<void>(failureOf([this] { merge("topic"); }));
             ::_exit(0);
         }
         int status = 0;
@@ -71,7 +71,7 @@ class InterruptedMerge : public vclink::test::MergeTest
     void expectRefused() const
     {
         const NothingChanges nothing(repository_);
-        const LibGit2Failure failure = libGit2FailureOf([this] { commit(); });
+        const Failure failure = failureOf([this] { commit(); });
         EXPECT_EQ(failure.code, GIT_ERROR);
         EXPECT_EQ(failure.errorClass, GIT_ERROR_MERGE);
         EXPECT_THAT(failure.text, HasSubstr("the merge of " + idOf("topic") + " was interrupted"));
@@ -86,7 +86,7 @@ class InterruptedMerge : public vclink::test::MergeTest
     void expectRefusedForItsIndex() const
     {
         const NothingChanges nothing(repository_);
-        const LibGit2Failure failure = libGit2FailureOf([this] { commit(); });
+        const Failure failure = failureOf([this] { commit(); });
         EXPECT_EQ(failure.errorClass, GIT_ERROR_MERGE);
         EXPECT_THAT(failure.text,
                     HasSubstr("nothing of what only " + idOf("topic") + " has changed"));
@@ -101,7 +101,7 @@ class InterruptedMerge : public vclink::test::MergeTest
     /// The commands that the text of a refused commit tells to run.
     std::string wayOut() const
     {
-        const std::string text = libGit2FailureOf([this] { commit(); }).text;
+        const std::string text = failureOf([this] { commit(); }).text;
         const std::string beginning = "in the root of the working copy: ";
         const auto found = text.find(beginning);
         return found == std::string::npos ? "false" : text.substr(found + beginning.size());
@@ -168,7 +168,7 @@ TEST_P(KilledMerge, IsNotConcludedByACommit)
     killMergeAt(GetParam());
     EXPECT_EQ(repository_.read(mergeMarker), markerOf("main", "topic"));
     ASSERT_TRUE(exists(indexLock));
-    EXPECT_EQ(libGit2FailureOf([this] { commit(); }).code, GIT_ELOCKED);
+    EXPECT_EQ(failureOf([this] { commit(); }).code, GIT_ELOCKED);
     repository_.remove(indexLock);
     expectRefused();
     repository_.git({"add", "--update"});
@@ -414,7 +414,7 @@ TEST_F(InterruptedMerge, IsSuspectedWhereEverythingOfTheirsWasPutBack)
     makeDiverged();
     repository_.git({"merge", "--quiet", "--no-commit", "--strategy=ours", "topic"});
     expectRefusedForItsIndex();
-    EXPECT_THAT(libGit2FailureOf([this] { commit(); }).text, HasSubstr("run: git commit"));
+    EXPECT_THAT(failureOf([this] { commit(); }).text, HasSubstr("run: git commit"));
     repository_.git({"commit", "--quiet", "--no-edit"});
     EXPECT_EQ(parents().size(), 2U);
 }

@@ -21,7 +21,7 @@ namespace
 namespace fs = std::filesystem;
 using testing::HasSubstr;
 using vclink::test::asPath;
-using vclink::test::libGit2FailureOf;
+using vclink::test::failureOf;
 using vclink::test::LogCapture;
 using vclink::test::LogRecord;
 using vclink::test::NothingChanges;
@@ -69,7 +69,7 @@ TEST_F(LockedIndex, MakesEveryOperationFailBeforeItsFirstWrite)
     for (const auto &[name, operation] : operations)
     {
         SCOPED_TRACE(name);
-        const auto failure = libGit2FailureOf(operation);
+        const auto failure = failureOf(operation);
         EXPECT_EQ(failure.code, GIT_ELOCKED);
         EXPECT_EQ(failure.errorClass, GIT_ERROR_INDEX);
         EXPECT_EQ(failure.text, "the index is locked by '" +
@@ -90,9 +90,9 @@ TEST_F(LockedIndex, KeepsACallbackFromChangingItMeanwhile)
     std::vector<int> codes;
     interactor_->progress.onCall = [&](std::size_t)
     {
-        codes.push_back(libGit2FailureOf(
-                            [&] { makeAdapter(repository_.path())->addFiles({path("untracked")}); })
-                            .code);
+        codes.push_back(
+            failureOf([&] { makeAdapter(repository_.path())->addFiles({path("untracked")}); })
+                .code);
         EXPECT_EQ(states(repository_, {"untracked"}).at("untracked"), "Unversioned");
     };
     branches().switchBranch("topic");

@@ -21,7 +21,7 @@ namespace
 namespace fs = std::filesystem;
 using std::chrono::milliseconds;
 using vclink::git::BranchParameters;
-using vclink::test::libGit2FailureOf;
+using vclink::test::failureOf;
 using vclink::test::stateOf;
 using Steady = std::chrono::steady_clock;
 

@@ -224,10 +224,10 @@ TEST_F(MergeDispatch, RefusesAnAnnotatedTagItself)
     repository_.git({"-c", "user.name=x", "-c", "user.email=x@y", "tag", "-a", "-m", "m",
                      "annotated", "topic"});
     const NothingChanges nothing(repository_);
-    EXPECT_EQ(failureOfMerge("annotated"),
-              textOf(vclink::test::LibGit2Failure{
-                  GIT_ENOTFOUND, GIT_ERROR_INVALID,
-                  "the requested type does not match the type in the ODB"}));
+    EXPECT_EQ(
+        failureOfMerge("annotated"),
+        textOf(vclink::test::Failure{GIT_ENOTFOUND, GIT_ERROR_INVALID,
+                                     "the requested type does not match the type in the ODB"}));
 }
 
 TEST_F(MergeDispatch, TakesALongCommitAndNamesItRight)
@@ -258,10 +258,10 @@ TEST_F(MergeDispatch, RefusesALongTagByItsRightId)
     repository_.git({"-c", "user.name=x", "-c", "user.email=x@y", "tag", "-a", "-m",
                      std::string(9000, 'x'), "annotated", "topic"});
     const NothingChanges nothing(repository_);
-    EXPECT_EQ(failureOfMerge("annotated"),
-              textOf(vclink::test::LibGit2Failure{
-                  GIT_ENOTFOUND, GIT_ERROR_INVALID,
-                  "the requested type does not match the type in the ODB"}));
+    EXPECT_EQ(
+        failureOfMerge("annotated"),
+        textOf(vclink::test::Failure{GIT_ENOTFOUND, GIT_ERROR_INVALID,
+                                     "the requested type does not match the type in the ODB"}));
     EXPECT_EQ(branches().getRevision("annotated"), idOf("annotated"));
 }
 
@@ -269,10 +269,10 @@ TEST_F(MergeDispatch, RefusesAFileByItsRightId)
 {
     makeDiverged();
     const NothingChanges nothing(repository_);
-    EXPECT_EQ(failureOfMerge("HEAD:file"),
-              textOf(vclink::test::LibGit2Failure{
-                  GIT_ENOTFOUND, GIT_ERROR_INVALID,
-                  "the requested type does not match the type in the ODB"}));
+    EXPECT_EQ(
+        failureOfMerge("HEAD:file"),
+        textOf(vclink::test::Failure{GIT_ENOTFOUND, GIT_ERROR_INVALID,
+                                     "the requested type does not match the type in the ODB"}));
 }
 
 TEST_F(MergeDispatch, TakesTheTagWhereABranchHasTheSameNameAsGitDoes)

@@ -25,9 +25,9 @@ namespace git = vclink::git;
 using testing::ElementsAre;
 using testing::HasSubstr;
 using testing::IsEmpty;
+using vclink::test::Failure;
+using vclink::test::failureOf;
 using vclink::test::LateCommit;
-using vclink::test::LibGit2Failure;
-using vclink::test::libGit2FailureOf;
 using vclink::test::LibGit2Recorder;
 using vclink::test::splitLines;
 using vclink::test::stateOf;
@@ -93,14 +93,14 @@ class MovedHead : public vclink::test::BranchCallsTest
     }
     static std::string movedText()
     {
-        return textOf(LibGit2Failure{GIT_EMODIFIED, GIT_ERROR_REFERENCE, git::Head::movedText});
+        return textOf(Failure{GIT_EMODIFIED, GIT_ERROR_REFERENCE, git::Head::movedText});
     }
     static std::string notCommittedText()
     {
-        return textOf(LibGit2Failure{GIT_EMODIFIED, GIT_ERROR_MERGE,
-                                     "the merge was not committed, because another process has "
-                                     "moved the current branch or ended the merge meanwhile: see "
-                                     "git status"});
+        return textOf(Failure{GIT_EMODIFIED, GIT_ERROR_MERGE,
+                              "the merge was not committed, because another process has "
+                              "moved the current branch or ended the merge meanwhile: see "
+                              "git status"});
     }
     /// Calls the hook after the merge's lock is given up and before its commit takes another.
     static void beforeTheCommit(LibGit2Recorder &calls, const std::function<void()> &hook)
@@ -123,8 +123,8 @@ TEST_F(MovedHead, RefusesASwitchBeforeItWrites)
     beginLateCommit();
     LibGit2Recorder calls;
     calls.on<git_checkout_tree>([this](auto...) { moveHead(); });
-    EXPECT_EQ(libGit2FailureOf([this] { branches().switchBranch("topic"); }),
-              (LibGit2Failure{GIT_EMODIFIED, GIT_ERROR_REFERENCE, git::Head::movedText}));
+    EXPECT_EQ(failureOf([this] { branches().switchBranch("topic"); }),
+              (Failure{GIT_EMODIFIED, GIT_ERROR_REFERENCE, git::Head::movedText}));
     expectUntouched();
     branches().switchBranch("topic");
     EXPECT_EQ(currentBranch(), "refs/heads/topic");
@@ -318,8 +318,7 @@ TEST_F(MovedHead, RefusesACommitThatWouldReplaceTheOther)
     beginLateCommit();
     LibGit2Recorder calls;
     calls.on<git_commit_create>([this](auto...) { moveHead(); });
-    EXPECT_EQ(libGit2FailureOf([this] { adapter_->commit(upath(), u"message"); }).code,
-              GIT_EMODIFIED);
+    EXPECT_EQ(failureOf([this] { adapter_->commit(upath(), u"message"); }).code, GIT_EMODIFIED);
     EXPECT_EQ(idOf("main"), moved_);
     expectLateKept();
     EXPECT_EQ(repository_.read("file"), "edited\n");

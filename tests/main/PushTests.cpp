@@ -18,7 +18,7 @@ namespace
 namespace git = vclink::git;
 using testing::Contains;
 using testing::StartsWith;
-using vclink::test::libGit2FailureOf;
+using vclink::test::failureOf;
 using vclink::test::LogCapture;
 using vclink::test::Naming;
 
@@ -80,7 +80,7 @@ TEST_P(Push, RefusesABranchThatCannotBeMovedForward)
     repository_.git({"fetch", "--quiet", "origin"});
     commit("file", "of the working copy\n");
     const auto before = references(server_);
-    const auto failure = libGit2FailureOf([this] { push({main_}); });
+    const auto failure = failureOf([this] { push({main_}); });
     EXPECT_EQ(failure.code, GIT_ENONFASTFORWARD);
     EXPECT_EQ(failure.errorClass, GIT_ERROR_REFERENCE);
     EXPECT_EQ(failure.text, "cannot push non-fastforwardable reference");
@@ -92,10 +92,7 @@ TEST_P(Push, RefusesABranchWhoseCommitsAreNotHere)
 {
     const std::string there = publish("file", "of the author again\n");
     commit("file", "of the working copy\n");
-    const auto failure = libGit2FailureOf(
-        [this] {
-            push({main_, "refs/heads/main:refs/heads/other"});
-        });
+    const auto failure = failureOf([this] { push({main_, "refs/heads/main:refs/heads/other"}); });
     EXPECT_EQ(failure.code, GIT_ENONFASTFORWARD);
     EXPECT_EQ(idOf(refMain, server_), there);
     EXPECT_FALSE(server_.tryGit({"rev-parse", "--verify", "refs/heads/other"}).succeeded());
@@ -140,14 +137,14 @@ TEST_P(Push, TakesFullNamesOnly)
 {
     const auto before = references(server_);
     commit("file", "changed\n");
-    EXPECT_LT(libGit2FailureOf([this] { push({"main:main"}); }).code, 0);
+    EXPECT_LT(failureOf([this] { push({"main:main"}); }).code, 0);
     EXPECT_EQ(references(server_), before);
 }
 
 TEST_P(Push, OfABranchThatIsNotHereFails)
 {
     const auto before = references(server_);
-    EXPECT_LT(libGit2FailureOf([this] { push({"refs/heads/no:refs/heads/no"}); }).code, 0);
+    EXPECT_LT(failureOf([this] { push({"refs/heads/no:refs/heads/no"}); }).code, 0);
     EXPECT_EQ(references(server_), before);
 }
 
@@ -171,7 +168,7 @@ TEST_P(Push, ToAWorkingCopyIsRefusedByLibGit2)
 {
     repository_.git({"remote", "set-url", "origin", nameOf(author_)});
     commit("file", "changed\n");
-    const auto failure = libGit2FailureOf([this] { push({main_}); });
+    const auto failure = failureOf([this] { push({main_}); });
     EXPECT_EQ(failure.code, GIT_EBAREREPO);
     EXPECT_EQ(failure.text, "local push doesn't (yet) support pushing to non-bare repos.");
 }
@@ -214,7 +211,7 @@ TEST_P(Push, LeavesNoDescriptorOpen)
     const vclink::test::NoDescriptorLeak noLeak;
     commit("file", "changed\n");
     push({main_});
-    libGit2FailureOf([this] { push({"refs/heads/no:refs/heads/no"}); });
+    failureOf([this] { push({"refs/heads/no:refs/heads/no"}); });
 }
 
 INSTANTIATE_TEST_SUITE_P(Locally, Push, testing::Values(Naming::PlainPath, Naming::FileUrl));

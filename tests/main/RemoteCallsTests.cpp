@@ -27,11 +27,11 @@ using testing::ElementsAre;
 using testing::IsEmpty;
 using vclink::test::asPath;
 using vclink::test::asUtf16;
-using vclink::test::LibGit2Failure;
-using vclink::test::libGit2FailureOf;
+using vclink::test::Failure;
+using vclink::test::failureOf;
 using Names = std::vector<std::string>;
 
-const LibGit2Failure injectedFailure{-31, GIT_ERROR_OS, "injected"};
+const Failure injectedFailure{-31, GIT_ERROR_OS, "injected"};
 
 const Names ofFetch{"git_repository_open_ext",   "git_remote_lookup",
                     "git_fetch_options_init",    "git_proxy_options_init",
@@ -77,24 +77,6 @@ class RemoteCalls : public vclink::test::RemoteTest
         const std::string target = (folder() / ("clone " + std::to_string(++clones_))).string();
         generator_.generate(asUtf16(nameOf(server_)), asPath(target));
     }
-    /// The operation's calls until one fails, and the releases that follow.
-    static Names untilFailure(const Names &names, const std::string &failing)
-    {
-        Names expected;
-        for (const auto &name : names)
-        {
-            expected.push_back(name);
-            if (name == failing)
-                break;
-        }
-        const bool isRemote = names.front() == "git_repository_open_ext";
-        if (isRemote && expected.size() > 2)
-            expected.emplace_back("git_remote_free");
-        if (isRemote && expected.size() > 1)
-            expected.emplace_back("git_repository_free");
-        return expected;
-    }
-
     const std::string mainId_ = commit("own", "x");
     vclink::git::GitWorkingCopyGenerator generator_{
         std::static_pointer_cast<vclink::ApplicationInteractor>(interactor_)};
@@ -115,24 +97,6 @@ TEST_F(RemoteCalls, OfEachOperationComeInOrder)
     }
 }
 
-/// No matter which of them fails, its error comes out, and every handle is released.
-TEST_F(RemoteCalls, ThatFailRaiseTheirErrorAndLeaveNoHandle)
-{
-    for (const auto &operation : operations())
-    {
-        for (const auto &name : operation.names)
-        {
-            if (name == "git_remote_free" || name == "git_repository_free")
-                continue;
-            calls_.clear();
-            calls_.fail({{name, injectedFailure.code}});
-            EXPECT_EQ(libGit2FailureOf(operation.run), injectedFailure) << name;
-            EXPECT_EQ(calls_.steps(), untilFailure(operation.names, name)) << name;
-            EXPECT_THAT(calls_.openHandles(), IsEmpty()) << name;
-        }
-    }
-}
-
 TEST_F(RemoteCalls, AreKeptFromTheSignalOfABrokenConnection)
 {
     Names unguarded;
@@ -146,7 +110,7 @@ TEST_F(RemoteCalls, AreKeptFromTheSignalOfABrokenConnection)
         operation.run();
         EXPECT_FALSE(isSigpipeBlocked());
         calls_.fail({{"git_proxy_options_init", -1}});
-        libGit2FailureOf(operation.run);
+        failureOf(operation.run);
         EXPECT_FALSE(isSigpipeBlocked());
         calls_.fail({});
     }
@@ -175,9 +139,9 @@ TEST_F(RemoteCalls, TakeTheNameAndTheRefspecsAsUtf8)
                                  { EXPECT_STREQ(name, "origin"); });
     const Names two{"refs/heads/gr\xC3\xBC\xC3\x9F:refs/own/\xE6\x9D\xB1", " odd caf\xE9 #\\*"};
     calls_.fail({{"git_remote_fetch", -31}, {"git_remote_push", -31}});
-    libGit2FailureOf([&] { fetch(two); });
-    libGit2FailureOf([&] { push(two); });
-    libGit2FailureOf([&] { fetch(); });
+    failureOf([&] { fetch(two); });
+    failureOf([&] { push(two); });
+    failureOf([&] { fetch(); });
     EXPECT_THAT(refspecs, ElementsAre(two, two, Names()));
 }
 
@@ -247,10 +211,10 @@ TEST_F(RemoteCalls, OfACloneComeAfterItsRecordItsTextsAndItsOptions)
                                               " sandboxRoot.string()=" + target));
     // A text that libgit2 can't take is told of, and refused before the options are asked for.
     toldAtTheOptions.clear();
-    EXPECT_EQ(libGit2FailureOf(
-                  [&] { generator.generate(ustring(u"a\0b", 3), asPath(folder() / "refused")); })
-                  .code,
-              GIT_EINVALIDSPEC);
+    EXPECT_EQ(
+        failureOf([&] { generator.generate(ustring(u"a\0b", 3), asPath(folder() / "refused")); })
+            .code,
+        GIT_EINVALIDSPEC);
     EXPECT_THAT(toldAtTheOptions, IsEmpty());
     EXPECT_EQ(log.messages().back().compare(0, 21, " repositorySpecifier="), 0);
 }
@@ -269,8 +233,7 @@ TEST_F(RemoteCalls, OfACloneThatFailsReleaseWhatItLeft)
         if (name == "git_repository_free")
             git_error_set_str(GIT_ERROR_OS, "of the release");
     };
-    EXPECT_EQ(libGit2FailureOf([this] { clone(); }),
-              (LibGit2Failure{-9, GIT_ERROR_NET, "of the clone"}));
+    EXPECT_EQ(failureOf([this] { clone(); }), (Failure{-9, GIT_ERROR_NET, "of the clone"}));
     EXPECT_EQ(calls_.steps().back(), "git_repository_free");
 }
 
@@ -315,7 +278,7 @@ TEST_F(RemoteCalls, OfAListingThatFailsTellTheFailure)
 {
     calls_.fail({{"git_remote_ls", -31}});
     const vclink::test::LogCapture log(git::SeverityDiagnostic);
-    EXPECT_EQ(libGit2FailureOf([this] { remote().getRemoteHeads(); }), injectedFailure);
+    EXPECT_EQ(failureOf([this] { remote().getRemoteHeads(); }), injectedFailure);
     EXPECT_THAT(log.messages(), ElementsAre("Throwing error injected (-31)"));
 }
 

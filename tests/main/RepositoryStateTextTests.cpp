@@ -14,7 +14,7 @@ namespace
 {
 
 using vclink::git::describeRepositoryState;
-using vclink::test::libGit2FailureOf;
+using vclink::test::failureOf;
 using vclink::test::NothingChanges;
 
 /// "main" and "topic", which both change "file", and "topic" one commit more.
@@ -156,7 +156,7 @@ TEST_F(RepositoryStateText, OfALinkedWorktreeIsItsOwn)
 TEST_F(RepositoryStateText, FailsOnlyWhereTheRepositoryCannotBeOpened)
 {
     repository_.remove(".git");
-    EXPECT_EQ(libGit2FailureOf([this] { branches().getRepositoryState(); }).code, GIT_ENOTFOUND);
+    EXPECT_EQ(failureOf([this] { branches().getRepositoryState(); }).code, GIT_ENOTFOUND);
 }
 
 /// Nothing tells then whether a merge is under way, and what would write must not guess.
@@ -166,7 +166,7 @@ TEST_F(RepositoryStateText, IsNormalWhereMergeHeadCannotBeLookedAt)
     const std::string head = idOf("HEAD");
     std::filesystem::create_symlink("MERGE_HEAD", file);
     EXPECT_EQ(branches().getRepositoryState(), "Normal");
-    EXPECT_EQ(libGit2FailureOf([this] { adapter_->commit(upath(), u"message"); }).text,
+    EXPECT_EQ(failureOf([this] { adapter_->commit(upath(), u"message"); }).text,
               "could not read '" + file + "': Too many levels of symbolic links");
     EXPECT_THROW(branches().merge("topic"), vclink::git::GitException);
     std::filesystem::remove(file);

@@ -28,7 +28,6 @@ using vclink::test::asPath;
 using vclink::test::Failure;
 using vclink::test::failureOf;
 using vclink::test::LibGit2Recorder;
-using vclink::test::NothingChanges;
 using vclink::test::ofTheQuery;
 using vclink::test::operator+;
 using Names = std::vector<std::string>;
@@ -92,17 +91,15 @@ class RevertCalls : public vclink::test::StagingTest
     std::vector<git_checkout_options> records_;
 };
 
-TEST_F(RevertCalls, ResetTheIndexAndCheckItOut)
+TEST_F(RevertCalls, ResetTheIndexAndCheckItOutWithAChangeOrWithout)
 {
-    revert({"file"});
-    EXPECT_EQ(calls_.steps(), ofTheReset + ofTheOptions + ofTheCheckout + ofTheRelease);
-    EXPECT_THAT(calls_.openHandles(), IsEmpty());
-}
-
-TEST_F(RevertCalls, AreTheSameWithoutAChange)
-{
-    revert({"other"});
-    EXPECT_EQ(calls_.steps(), ofTheReset + ofTheOptions + ofTheCheckout + ofTheRelease);
+    for (const auto *name : {"file", "other"})
+    {
+        calls_.clear();
+        revert({name});
+        EXPECT_EQ(calls_.steps(), ofTheReset + ofTheOptions + ofTheCheckout + ofTheRelease);
+        EXPECT_THAT(calls_.openHandles(), IsEmpty());
+    }
 }
 
 TEST_F(RevertCalls, ResetOnceWhereFilesWereOnlyAdded)
@@ -170,15 +167,6 @@ TEST_F(RevertCalls, HaveTheFilesOfTheListInItsOrder)
     EXPECT_THAT(checkoutFiles_, ElementsAre(expected));
 }
 
-TEST_F(RevertCalls, CheckOutByForceAndBringBackMissingFiles)
-{
-    revert({"file"});
-    ASSERT_EQ(records_.size(), 1U);
-    EXPECT_EQ(records_[0].checkout_strategy, 6U);
-    EXPECT_EQ(records_[0].checkout_strategy,
-              static_cast<unsigned>(GIT_CHECKOUT_FORCE | GIT_CHECKOUT_RECREATE_MISSING));
-}
-
 TEST_F(RevertCalls, CheckOutByForceWhateverTheFactorySays)
 {
     for (const std::uint64_t strategy :
@@ -193,10 +181,13 @@ TEST_F(RevertCalls, CheckOutByForceWhateverTheFactorySays)
     }
 }
 
-TEST_F(RevertCalls, CheckOutWithTheAdaptersCallbacks)
+TEST_F(RevertCalls, CheckOutByForceWithTheAdaptersCallbacksThroughNoLinkOrFifo)
 {
     revert({"file"});
     ASSERT_EQ(records_.size(), 1U);
+    EXPECT_EQ(records_[0].checkout_strategy,
+              static_cast<unsigned>(GIT_CHECKOUT_FORCE | GIT_CHECKOUT_RECREATE_MISSING));
+    EXPECT_EQ(records_[0].file_open_flags, O_CREAT | O_TRUNC | O_WRONLY | O_NOFOLLOW | O_NONBLOCK);
     const void *const callbacks = &adapter_.getCallbacks().checkoutCallbacks();
     EXPECT_EQ(records_[0].version, 1U);
     EXPECT_EQ(records_[0].notify_flags, static_cast<unsigned>(GIT_CHECKOUT_NOTIFY_ALL));
@@ -218,13 +209,6 @@ TEST_F(RevertCalls, PassTheNotificationsOnToTheAdaptersCallbacks)
     interactor_->cancel();
     repository_.write("file", "edited");
     EXPECT_THROW(revert({"file"}), vclink::util::exception::CancelledOperationException);
-}
-
-TEST_F(RevertCalls, WriteThroughNoLinkAndWaitForNoFifo)
-{
-    revert({"file"});
-    ASSERT_EQ(records_.size(), 1U);
-    EXPECT_EQ(records_[0].file_open_flags, O_CREAT | O_TRUNC | O_WRONLY | O_NOFOLLOW | O_NONBLOCK);
 }
 
 TEST_F(RevertCalls, AskTheFactoryOnceAndHoldAShareOfIt)
@@ -274,48 +258,18 @@ TEST_F(RevertCalls, AreThoseOfTheQueryAloneWhereAFileIsInConflict)
     EXPECT_THAT(calls_.openHandles(), IsEmpty());
 }
 
-/// A call that fails, and what follows it.
-class FailingRevertCalls : public RevertCalls
+TEST_F(RevertCalls, ThatFailAfterTheResetLeaveItInPlace)
 {
-  protected:
-    void expectFails(const std::string &name, const Names &expected)
+    repository_.add({"file"});
+    const auto expected = stateAfterGit({{"restore", "--staged", "."}});
+    for (const auto *name : {"git_checkout_options_init", "git_checkout_index"})
     {
-        SCOPED_TRACE(name);
-        calls_.clear();
+        repository_.add({"file"});
         calls_.fail({{name, GIT_EAUTH}});
         EXPECT_EQ(failureOf([this] { revert({"file"}); }),
                   (Failure{GIT_EAUTH, GIT_ERROR_OS, "injected"}));
-        EXPECT_EQ(calls_.steps(), expected);
-        EXPECT_THAT(calls_.openHandles(), IsEmpty());
+        EXPECT_EQ(stateOf(repository_), expected) << name;
     }
-};
-
-TEST_F(FailingRevertCalls, OfTheOpeningChangeNothing)
-{
-    const NothingChanges nothing(repository_);
-    expectFails("git_repository_open_ext", {"git_status_options_init", "git_repository_open_ext"});
-}
-
-TEST_F(FailingRevertCalls, OfTheResetChangeNothing)
-{
-    const NothingChanges nothing(repository_);
-    expectFails("git_reset_default", ofTheReset + ofTheRelease);
-}
-
-TEST_F(FailingRevertCalls, AfterTheResetLeaveItInPlace)
-{
-    repository_.add({"file"});
-    const auto expected = stateAfterGit({{"restore", "--staged", "."}});
-    expectFails("git_checkout_options_init", ofTheReset + ofTheOptions + ofTheRelease);
-    EXPECT_EQ(stateOf(repository_), expected);
-}
-
-TEST_F(FailingRevertCalls, OfTheCheckoutLeaveTheResetInPlace)
-{
-    repository_.add({"file"});
-    const auto expected = stateAfterGit({{"restore", "--staged", "."}});
-    expectFails("git_checkout_index", ofTheReset + ofTheOptions + ofTheCheckout + ofTheRelease);
-    EXPECT_EQ(stateOf(repository_), expected);
 }
 
 } // namespace

@@ -6,7 +6,6 @@
 #include <gtest/gtest.h>
 
 #include "StagingTest.hpp"
-#include "support/Descriptors.hpp"
 
 namespace
 {
@@ -140,7 +139,7 @@ TEST_F(RevertFailure, OfACheckoutLeavesTheResetInPlace)
 }
 
 /// What came before the failure is on disk.
-TEST_F(RevertFailure, OfACheckoutMayLeaveSomeFilesRestored)
+TEST_F(RevertFailure, OfACheckoutMayLeaveSomeFilesRestoredAndIsOverWhenItsCauseIsGone)
 {
     repository_.remove("sub/inside");
     giveAway();
@@ -151,15 +150,6 @@ TEST_F(RevertFailure, OfACheckoutMayLeaveSomeFilesRestored)
     expected.workingTree["other"] = "644 content of other\n";
     unprivilegedFailureOf([this] { revert({"sub/inside", "file", "other"}); });
     EXPECT_EQ(stateOf(repository_), expected);
-    repository_.setMode("sub", 0755);
-}
-
-TEST_F(RevertFailure, OfACheckoutIsOverWhenItsCauseIsGone)
-{
-    repository_.remove("sub/inside");
-    giveAway();
-    repository_.setMode("sub", 0555);
-    unprivilegedFailureOf([this] { revert({"sub/inside", "file", "other"}); });
     repository_.setMode("sub", 0755);
     revert({"sub/inside", "file", "other"});
     EXPECT_THAT(status(), ElementsAre());
@@ -228,19 +218,6 @@ TEST_F(RevertFailure, OfALinkThatCannotBeRemovedWritesNothingThroughIt)
     EXPECT_EQ(stateOf(repository_), expected);
     EXPECT_EQ(repository_.read("../outside"), "precious");
     repository_.setMode("sub", 0755);
-}
-
-TEST_F(RevertFailure, LeavesNoDescriptorOpen)
-{
-    repository_.write(".git/index.lock", "");
-    const auto run = [this] { failureOf([this] { revert({"file"}); }); };
-    run();
-    const vclink::test::NoDescriptorLeak noLeak;
-    run();
-    repository_.remove(".git/index.lock");
-    repository_.remove("sub");
-    repository_.write("sub", "x");
-    failureOf([this] { revert({"sub/inside"}); });
 }
 
 } // namespace

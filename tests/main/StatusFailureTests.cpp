@@ -7,7 +7,6 @@
 
 #include "AdapterTest.hpp"
 #include "error/errorUtil/callbackException.hpp"
-#include "support/Descriptors.hpp"
 #include "support/UnprivilegedUser.hpp"
 #include "support/libgit2Release.hpp"
 #include "support/text.hpp"
@@ -21,7 +20,7 @@ using vclink::test::asPath;
 using vclink::test::GitRepository;
 using vclink::test::States;
 
-/// Code of what the query of the whole tree raises; 0 for none.
+/// Code of what the query of the whole tree throws; 0 for none.
 int raisedBy(vclink::git::GitAdapter &adapter)
 {
     try
@@ -58,38 +57,6 @@ TEST_F(StatusFailure, OfABareRepositoryGivesAnEmptyMap)
     EXPECT_TRUE(adapter->getFileStates({asPath(bare + "/file")}).empty());
 }
 
-TEST_F(StatusFailure, OfABrokenIndexGivesAnEmptyMap)
-{
-    repository_.write(".git/index",
-                      "this is no index, and long enough to be told from an empty one");
-    EXPECT_EQ(allStates(repository_), States());
-    EXPECT_EQ(states(repository_, {"file"}), States());
-}
-
-TEST_F(StatusFailure, OfATruncatedIndexGivesAnEmptyMap)
-{
-    const std::string index = repository_.read(".git/index");
-    repository_.write(".git/index", index.substr(0, index.size() / 2));
-    EXPECT_EQ(allStates(repository_), States());
-}
-
-TEST_F(StatusFailure, OfABrokenTreeGivesAnEmptyMap)
-{
-    const std::string tree = repository_.line({"rev-parse", "HEAD^{tree}"});
-    const std::string object = ".git/objects/" + tree.substr(0, 2) + "/" + tree.substr(2);
-    repository_.remove(object);
-    repository_.write(object, "this is no object");
-    EXPECT_EQ(allStates(repository_), States());
-}
-
-TEST_F(StatusFailure, LeavesNoExceptionWaiting)
-{
-    repository_.write(".git/index",
-                      "this is no index, and long enough to be told from an empty one");
-    allStates(repository_);
-    EXPECT_EQ(vclink::git::pendingCallbackException(), nullptr);
-}
-
 TEST_F(StatusFailure, OfAnOpeningIsRaised)
 {
     repository_.write(".git/config", "[core\n");
@@ -113,26 +80,6 @@ TEST_F(StatusFailure, OfAFormatThatLibGit2DoesNotKnowIsRaised)
               vclink::test::libgit2Release::refusalOfWorktreeConfig);
 }
 
-/// A format that only the walk meets.
-TEST_F(StatusFailure, OfASplitIndexGivesAnEmptyMap)
-{
-    repository_.git({"update-index", "--split-index"});
-    EXPECT_EQ(allStates(repository_), States());
-}
-
-TEST_F(StatusFailure, OfASparseIndexGivesAnEmptyMap)
-{
-    repository_.write("sub/inside", "x");
-    repository_.commitAll("second");
-    repository_.git({"config", "index.sparse", "true"});
-    repository_.git({"config", "core.sparseCheckoutCone", "true"});
-    repository_.git({"config", "core.sparseCheckout", "true"});
-    repository_.write(".git/info/sparse-checkout", "/*\n!/*/\n");
-    repository_.git({"read-tree", "-mu", "HEAD"});
-    ASSERT_NE(repository_.git({"ls-files", "--sparse"}).find("sub/\n"), std::string::npos);
-    EXPECT_EQ(allStates(repository_), States());
-}
-
 TEST_F(StatusFailure, DoesNotComeOfALockedIndex)
 {
     repository_.write(".git/index.lock", "");
@@ -143,12 +90,6 @@ TEST_F(StatusFailure, DoesNotComeOfAHeadThatNamesNothing)
 {
     repository_.write(".git/HEAD", "ref: refs/heads/nowhere\n");
     EXPECT_EQ(allStates(repository_), (States{{"file", "Added"}, {"new", "Unversioned"}}));
-}
-
-TEST_F(StatusFailure, OfAHeadThatIsGarbageGivesAnEmptyMap)
-{
-    repository_.write(".git/HEAD", "no reference\n");
-    EXPECT_EQ(allStates(repository_), States());
 }
 
 /// What an unreadable folder of untracked files holds is not known, and the rest is told.
@@ -174,21 +115,74 @@ TEST_F(StatusFailure, OfATrackedFolderThatCannotBeReadTellsItsFilesAsMissing)
                   States{{"file", "Clean"}, {"locked/inside", "Missing"}, {"new", "Clean"}}));
 }
 
-TEST_F(StatusFailure, LeavesNoDescriptorOpen)
+void breakIndex(GitRepository &repository)
 {
-    const auto fine = makeAdapter(repository_.path());
-    const GitRepository broken = GitRepository::clone(repository_.path(), folder() / "broken");
-    broken.write(".git/index", "this is no index, and long enough to be told from an empty one");
-    const auto failing = makeAdapter(broken.path());
-    const auto missing = makeAdapter(folder() / "missing");
-    raisedBy(*fine);
-    const vclink::test::NoDescriptorLeak noLeak;
-    for (int i = 0; i < 10; ++i)
-    {
-        EXPECT_EQ(raisedBy(*fine), 0);
-        EXPECT_EQ(raisedBy(*failing), 0);
-        EXPECT_EQ(raisedBy(*missing), GIT_ENOTFOUND);
-    }
+    repository.write(".git/index",
+                     "this is no index, and long enough to be told from an empty one");
 }
+
+void truncateIndex(GitRepository &repository)
+{
+    const std::string index = repository.read(".git/index");
+    repository.write(".git/index", index.substr(0, index.size() / 2));
+}
+
+void splitIndex(GitRepository &repository)
+{
+    repository.git({"update-index", "--split-index"});
+}
+
+void makeIndexSparse(GitRepository &repository)
+{
+    repository.write("sub/inside", "x");
+    repository.commitAll("second");
+    repository.git({"config", "index.sparse", "true"});
+    repository.git({"config", "core.sparseCheckoutCone", "true"});
+    repository.git({"config", "core.sparseCheckout", "true"});
+    repository.write(".git/info/sparse-checkout", "/*\n!/*/\n");
+    repository.git({"read-tree", "-mu", "HEAD"});
+    ASSERT_NE(repository.git({"ls-files", "--sparse"}).find("sub/\n"), std::string::npos);
+}
+
+void breakTree(GitRepository &repository)
+{
+    const std::string tree = repository.line({"rev-parse", "HEAD^{tree}"});
+    const std::string object = ".git/objects/" + tree.substr(0, 2) + "/" + tree.substr(2);
+    repository.remove(object);
+    repository.write(object, "this is no object");
+}
+
+void breakHead(GitRepository &repository)
+{
+    repository.write(".git/HEAD", "no reference\n");
+}
+
+/// What only the walk meets.
+struct BrokenPart
+{
+    const char *sentence;
+    void (*breakIt)(GitRepository &);
+};
+
+class StatusOf : public StatusFailure, public testing::WithParamInterface<BrokenPart>
+{
+};
+
+TEST_P(StatusOf, IsAnEmptyMapAndNoExceptionWaits)
+{
+    GetParam().breakIt(repository_);
+    EXPECT_EQ(allStates(repository_), States());
+    EXPECT_EQ(states(repository_, {"file"}), States());
+    EXPECT_EQ(vclink::git::pendingCallbackException(), nullptr);
+}
+
+const BrokenPart brokenParts[]{
+    {"ABrokenIndex", breakIndex}, {"ATruncatedIndex", truncateIndex},
+    {"ASplitIndex", splitIndex},  {"ASparseIndex", makeIndexSparse},
+    {"ABrokenTree", breakTree},   {"AHeadThatIsGarbage", breakHead},
+};
+
+INSTANTIATE_TEST_SUITE_P(With, StatusOf, testing::ValuesIn(brokenParts),
+                         [](const auto &test) { return test.param.sentence; });
 
 } // namespace

@@ -55,10 +55,10 @@ class SwitchBranchTest : public BranchTest
         expected.reflog.clear();
         EXPECT_EQ(state, expected);
     }
-    void expectRefused(const std::string &name, const LibGit2Failure &failure) const
+    void expectRefused(const std::string &name, const Failure &failure) const
     {
         const NothingChanges nothing(repository_);
-        EXPECT_EQ(libGit2FailureOf([&] { switchTo(name); }), failure);
+        EXPECT_EQ(failureOf([&] { switchTo(name); }), failure);
     }
     void expectCancelled(const std::string &name) const
     {

@@ -23,7 +23,7 @@ namespace git = vclink::git;
 using testing::ElementsAre;
 using testing::IsEmpty;
 using vclink::test::asPath;
-using vclink::test::libGit2FailureOf;
+using vclink::test::failureOf;
 using vclink::test::LogCapture;
 using vclink::test::NothingChanges;
 using vclink::test::stateOf;
@@ -179,7 +179,7 @@ TEST_F(SwitchBranch, TakesLocalBranchesOnly)
           std::string("missing")})
     {
         const NothingChanges nothing(repository_);
-        const auto failure = libGit2FailureOf([&] { switchTo(name); });
+        const auto failure = failureOf([&] { switchTo(name); });
         EXPECT_THAT(failure.code, testing::AnyOf(GIT_ENOTFOUND, GIT_EINVALIDSPEC)) << name;
         EXPECT_EQ(failure.errorClass, GIT_ERROR_REFERENCE) << name;
     }
@@ -188,7 +188,7 @@ TEST_F(SwitchBranch, TakesLocalBranchesOnly)
 TEST_F(SwitchBranch, FailsForAnEmptyName)
 {
     const NothingChanges nothing(repository_);
-    EXPECT_LT(libGit2FailureOf([this] { switchTo(""); }).code, 0);
+    EXPECT_LT(failureOf([this] { switchTo(""); }).code, 0);
 }
 
 /// The tree is the one that the name means as a revision, and there a tag comes first.
@@ -203,7 +203,7 @@ TEST_F(SwitchBranch, TakesTheTreeOfATagThatHidesTheBranch)
 TEST_F(SwitchBranch, FailsWhereTheRepositoryCannotBeOpened)
 {
     repository_.remove(".git");
-    EXPECT_EQ(libGit2FailureOf([this] { switchTo("topic"); }).code, GIT_ENOTFOUND);
+    EXPECT_EQ(failureOf([this] { switchTo("topic"); }).code, GIT_ENOTFOUND);
 }
 
 /// libgit2 finds that out when the files are written.
@@ -231,7 +231,7 @@ TEST_F(SwitchBranch, IsRefusedWhileTheIndexIsLocked)
 {
     repository_.write(".git/index.lock", "");
     const std::string head = idOf("HEAD");
-    EXPECT_EQ(libGit2FailureOf([this] { switchTo("topic"); }).code, GIT_ELOCKED);
+    EXPECT_EQ(failureOf([this] { switchTo("topic"); }).code, GIT_ELOCKED);
     EXPECT_EQ(currentBranch(), "refs/heads/main");
     EXPECT_EQ(idOf("HEAD"), head);
 }
@@ -240,7 +240,7 @@ TEST_F(SwitchBranch, IsRefusedWhileTheIndexIsLocked)
 TEST_F(SwitchBranch, LeavesTheHeadWhenItCannotBeMoved)
 {
     interactor_->progress.onCall = [this](std::size_t) { repository_.write(".git/HEAD.lock", ""); };
-    EXPECT_EQ(libGit2FailureOf([this] { switchTo("topic"); }).code, GIT_ELOCKED);
+    EXPECT_EQ(failureOf([this] { switchTo("topic"); }).code, GIT_ELOCKED);
     EXPECT_EQ(currentBranch(), "refs/heads/main");
     EXPECT_EQ(repository_.read("a"), "of topic, and longer\n");
     EXPECT_THAT(status(), ElementsAre("M  a", "D  b", "A  folder/new"));

@@ -11,7 +11,7 @@
 namespace
 {
 
-using vclink::test::LibGit2Failure;
+using vclink::test::Failure;
 using vclink::test::stateOf;
 using vclink::test::textOf;
 
@@ -105,8 +105,8 @@ class RefusedThreeWayMerge : public vclink::test::MergeTest
         auto expected = stateOf(repository_);
         const auto index = vclink::test::indexStampOf(repository_);
         EXPECT_EQ(failureOfMerge("topic"),
-                  textOf(LibGit2Failure{GIT_ECONFLICT, GIT_ERROR_MERGE,
-                                        "1 uncommitted change would be overwritten by merge"}));
+                  textOf(Failure{GIT_ECONFLICT, GIT_ERROR_MERGE,
+                                 "1 uncommitted change would be overwritten by merge"}));
         // All that libgit2 leaves.
         expected.underWay["ORIG_HEAD"] = idOf("HEAD") + '\n';
         EXPECT_EQ(stateOf(repository_), expected);
@@ -140,8 +140,8 @@ TEST_F(RefusedThreeWayMerge, KeepsAnUntrackedFileInTheWay)
     EXPECT_FALSE(makeTwin().tryGit({"merge", "--quiet", "--no-edit", "topic"}).succeeded());
     const vclink::test::NothingChanges nothing(repository_);
     EXPECT_EQ(failureOfMerge("topic"),
-              textOf(LibGit2Failure{GIT_ECONFLICT, GIT_ERROR_CHECKOUT,
-                                    "the untracked file 'new' is in the way of the checkout"}));
+              textOf(Failure{GIT_ECONFLICT, GIT_ERROR_CHECKOUT,
+                             "the untracked file 'new' is in the way of the checkout"}));
 }
 
 } // namespace

@@ -85,7 +85,7 @@ TEST_P(Clone, OfWhatIsNotThereFailsAndLeavesNoFolder)
 {
     const auto failure = failureOf([this] { clone(url_ + "-missing", "clone"); });
     EXPECT_LT(failure.code, 0);
-    EXPECT_NE(failure.message, "");
+    EXPECT_NE(failure.text, "");
     EXPECT_FALSE(std::filesystem::exists(folder() / "clone"));
 }
 

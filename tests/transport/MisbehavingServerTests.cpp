@@ -40,7 +40,7 @@ void expectToldBy(const Failure &failure)
 {
     EXPECT_LT(failure.code, 0);
     EXPECT_GT(failure.errorClass, 0);
-    EXPECT_NE(failure.message, "");
+    EXPECT_NE(failure.text, "");
     std::cout << "ends with " << testing::PrintToString(failure) << '\n';
 }
 

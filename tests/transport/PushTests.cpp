@@ -109,7 +109,7 @@ TEST_P(Push, RefusesABranchThatIsNotBehind)
     const auto failure = failureOf([this] { push(clone_, {"HEAD:refs/heads/ahead"}); });
     EXPECT_EQ(failure.code, GIT_ENONFASTFORWARD);
     EXPECT_EQ(failure.errorClass, GIT_ERROR_REFERENCE);
-    EXPECT_EQ(failure.message, "cannot push non-fastforwardable reference");
+    EXPECT_EQ(failure.text, "cannot push non-fastforwardable reference");
     EXPECT_EQ(servedId("refs/heads/ahead"), second_);
 }
 
@@ -119,8 +119,8 @@ TEST_P(Push, RefusesABranchWhoseCommitsItDoesNotHave)
     publish({"main"});
     const auto failure = failureOf([this] { push(clone_, {"refs/heads/main:refs/heads/main"}); });
     EXPECT_EQ(failure.code, GIT_ENONFASTFORWARD);
-    EXPECT_EQ(failure.message, "cannot push because a reference that you are trying to update on "
-                               "the remote contains commits that are not present locally.");
+    EXPECT_EQ(failure.text, "cannot push because a reference that you are trying to update on "
+                            "the remote contains commits that are not present locally.");
     EXPECT_EQ(servedId("refs/heads/main"), ahead);
 }
 

@@ -21,12 +21,6 @@ std::vector<ustring> asTexts(const std::vector<std::string> &texts)
 
 } // namespace
 
-void PrintTo(const Failure &failure, std::ostream *stream)
-{
-    *stream << "code " << failure.code << ", class " << failure.errorClass << ": "
-            << failure.message;
-}
-
 std::string referencesOf(const GitRepository &repository)
 {
     return repository.git({"for-each-ref", "--format=%(refname) %(objectname) %(symref)"});

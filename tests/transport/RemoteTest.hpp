@@ -9,6 +9,7 @@
 
 #include <gtest/gtest.h>
 
+#include "support/Failure.hpp"
 #include "support/GitTest.hpp"
 #include "support/LibGit2Session.hpp"
 #include "support/TestInteractor.hpp"
@@ -16,46 +17,10 @@
 #include "vclink/CMAdapter.hpp"
 #include "vclink/WorkingCopyGenerator.hpp"
 #include "vclink/git/GitRemote.hpp"
-#include "vclink/git/LibGit2Exception.hpp"
 #include "vclink/util/exception/CancelledOperationException.hpp"
 
 namespace vclink::test
 {
-
-/// What a failure of libgit2 tells.
-struct Failure
-{
-    int code = 0;
-    int errorClass = 0;
-    std::string message;
-};
-
-void PrintTo(const Failure &failure, std::ostream *stream);
-
-/// What libgit2 gave as the reason of an operation's failure. Fails the test when the operation
-/// goes through or ends with another exception; one that shows a text without libgit2's counts as
-/// such.
-template <class Operation> Failure failureOf(Operation operation)
-{
-    try
-    {
-        operation();
-        ADD_FAILURE() << "nothing was raised";
-    }
-    catch (const git::LibGit2Exception &exception)
-    {
-        const Failure failure{exception.getError().getCode(), exception.getError().getErrorClass(),
-                              asUtf8(exception.getError().getMessage())};
-        EXPECT_NE(asUtf8(exception.GetUnicodeMessageTxt()).find(failure.message),
-                  std::string::npos);
-        return failure;
-    }
-    catch (const std::exception &exception)
-    {
-        ADD_FAILURE() << typeid(exception).name() << ": " << exception.what();
-    }
-    return {};
-}
 
 /// Whether an operation ends with a cancellation, and with nothing derived from it.
 template <class Operation> testing::AssertionResult isCancelled(Operation operation)

@@ -93,7 +93,7 @@ class SshCredentials : public RunningSshServer, public vclink::test::RemoteTest
     {
         EXPECT_EQ(failure.code, GIT_EAUTH);
         EXPECT_EQ(failure.errorClass, GIT_ERROR_SSH);
-        EXPECT_THAT(failure.message, HasSubstr(std::string(libgit2Release::endOfSshTries)));
+        EXPECT_THAT(failure.text, HasSubstr(std::string(libgit2Release::endOfSshTries)));
         EXPECT_GE(requests_, 1);
         EXPECT_LE(requests_, 7);
     }
@@ -108,7 +108,7 @@ class SshCredentials : public RunningSshServer, public vclink::test::RemoteTest
         }
         EXPECT_EQ(failure.code, GIT_ERROR);
         EXPECT_EQ(failure.errorClass, GIT_ERROR_SSH);
-        EXPECT_THAT(failure.message, HasSubstr(reason));
+        EXPECT_THAT(failure.text, HasSubstr(reason));
         EXPECT_EQ(requests_, 1);
     }
 

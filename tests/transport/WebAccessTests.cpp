@@ -69,7 +69,7 @@ TEST_P(WebPassword, IsAskedForInVain)
     const auto failure = vclink::test::failureOf([&] { clone(url, "clone"); });
     std::cout << "ends with " << testing::PrintToString(failure) << '\n';
     EXPECT_EQ(failure.code, GIT_ERROR);
-    EXPECT_EQ(failure.message, "");
+    EXPECT_EQ(failure.text, "");
     EXPECT_FALSE(std::filesystem::exists(folder() / "clone"));
     const std::string request = " url=" + url + " username_from_url= allowed_types=1";
     const auto messages = log.messages();
@@ -92,7 +92,7 @@ TEST_P(WebPassword, AskedForInVainLeavesNoTextOfAnEarlierCall)
         {
             EXPECT_EQ(failure.code, GIT_ERROR);
             EXPECT_EQ(failure.errorClass, 0);
-            EXPECT_EQ(failure.message, "");
+            EXPECT_EQ(failure.text, "");
         }
     }
 }

@@ -91,8 +91,8 @@ class Passing;
 ///
 ///     calls.clear();
 ///     calls.fail({{"git_repository_set_head", GIT_ELOCKED}});
-///     EXPECT_EQ(libGit2FailureOf([&] { branches().switchBranch("topic"); }),
-///               (LibGit2Failure{GIT_ELOCKED, GIT_ERROR_OS, injectedText}));
+///     EXPECT_EQ(failureOf([&] { branches().switchBranch("topic"); }),
+///               (Failure{GIT_ELOCKED, GIT_ERROR_OS, injectedText}));
 ///
 /// The functions are those that the library's objects call, so a call that is new in the library is
 /// followed as soon as it is built. Naming another function fails the test: nothing would come of

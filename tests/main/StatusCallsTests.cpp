@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: MIT
+// The calls of libgit2 that a status query makes.
 #include <exception>
 #include <functional>
 #include <memory>
@@ -19,6 +20,7 @@
 #include "options/Callbacks.hpp"
 #include "support/LogCapture.hpp"
 #include "support/libgit2/LibGit2Recorder.hpp"
+#include "support/libgit2Release.hpp"
 #include "support/text.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
 
@@ -140,27 +142,6 @@ TEST_F(StatusWalk, OpensTheRootItselfWithoutASearch)
     EXPECT_THAT(paths, ElementsAre(repository_.path().string(), repository_.path().string()));
 }
 
-TEST_F(StatusWalk, RaisesWhenTheOptionsCannotBeInitialised)
-{
-    calls_.answer<git_status_options_init>(
-        [](auto...)
-        {
-            git_error_set_str(GIT_ERROR_INVALID, "invalid version 1 on git_status_options");
-            return -1;
-        });
-    try
-    {
-        query();
-        FAIL() << "no exception";
-    }
-    catch (const LibGit2Exception &exception)
-    {
-        EXPECT_EQ(exception.getError().getCode(), -1);
-        EXPECT_EQ(exception.getError().getMessage(), u"invalid version 1 on git_status_options");
-    }
-    EXPECT_THAT(calls_.steps(), ElementsAre("git_status_options_init"));
-}
-
 TEST_F(StatusWalk, GivesTheStatesUpToAFailureOfLibGit2)
 {
     for (const int code : {-1, -3, -7, -31, 1})
@@ -177,26 +158,23 @@ TEST_F(StatusWalk, GivesTheStatesUpToAFailureOfLibGit2)
     }
 }
 
-TEST_F(StatusWalk, NeitherLogsNorRaisesAFailure)
+TEST_F(StatusWalk, NeitherLogsNorRaisesAFailureAndReleasesTheRepository)
 {
     calls_.answer<git_status_foreach_ext>([](auto...) { return GIT_ERROR; });
     const LogCapture log(0x08 | 0x10);
     EXPECT_EQ(query(), States());
     EXPECT_THAT(log.messages(), ElementsAre());
-}
-
-TEST_F(StatusWalk, ReleasesTheRepositoryAfterAFailure)
-{
-    calls_.answer<git_status_foreach_ext>([](auto...) { return GIT_ERROR; });
-    query();
     EXPECT_EQ(calls_.steps().back(), "git_repository_free");
 }
 
-TEST_F(StatusWalk, GivesTheStatesUpToAnExceptionInTheCallback)
+TEST_F(StatusWalk, GivesTheStatesUpToAnExceptionInTheCallbackAndWorksAgain)
 {
     raiseAfter(2, [] { throw std::runtime_error("in the callback"); });
     EXPECT_EQ(query(), twoStates);
     EXPECT_EQ(code_, GIT_EUSER);
+    EXPECT_NE(pendingCallbackException(), nullptr);
+    calls_.answer<git_status_foreach_ext>(nullptr);
+    EXPECT_EQ(query(), fourStates);
     EXPECT_NE(pendingCallbackException(), nullptr);
 }
 
@@ -232,15 +210,6 @@ TEST_F(StatusWalk, LeavesAnExceptionOfAnyKindFound)
     }
 }
 
-TEST_F(StatusWalk, WorksAgainAfterAnException)
-{
-    raiseAfter(1, [] { throw std::runtime_error("in the callback"); });
-    query();
-    calls_.answer<git_status_foreach_ext>(nullptr);
-    EXPECT_EQ(query(), fourStates);
-    EXPECT_NE(pendingCallbackException(), nullptr);
-}
-
 #ifdef __clang__
 // clang's text of a lambda tells the arguments' types only.
 constexpr const char *traceOfTheCallback = "makeCallbackImpl";
@@ -255,6 +224,95 @@ TEST_F(StatusWalk, TracesEachCallOfTheCallback)
     const auto messages = log.messages();
     ASSERT_EQ(messages.size(), 4U);
     EXPECT_THAT(messages, Each(HasSubstr(traceOfTheCallback)));
+}
+
+/// What a walk was asked for.
+struct Asked
+{
+    git_status_options options{};
+    std::vector<std::string> pathspec;
+    std::string repository;
+    bool hasCallback = false;
+    bool hasPayload = false;
+};
+
+/// The record that the library hands to a status walk.
+class StatusRecord : public vclink::test::AdapterTest
+{
+  protected:
+    StatusRecord()
+    {
+        calls_.answer<git_status_foreach_ext>(
+            [this](auto, git_repository *repository, const git_status_options *options,
+                   git_status_cb callback, void *payload)
+            {
+                const git_strarray &pathspec = options->pathspec;
+                walks_.push_back({*options,
+                                  {pathspec.strings, pathspec.strings + pathspec.count},
+                                  git_repository_workdir(repository),
+                                  callback != nullptr,
+                                  payload != nullptr});
+                return 0;
+            });
+        adapter_ = makeAdapter(repository_.path());
+    }
+
+    vclink::test::GitRepository repository_ = makeRepository();
+    LibGit2Recorder calls_;
+    std::vector<Asked> walks_;
+    std::unique_ptr<vclink::git::GitAdapter> adapter_;
+};
+
+TEST_F(StatusRecord, HasTheseFieldsAndHoldsOtherwiseWhatLibGit2Initialises)
+{
+    git_status_options initialised;
+    ASSERT_EQ(git_status_options_init(&initialised, GIT_STATUS_OPTIONS_VERSION), 0);
+    adapter_->getFolderStates(adapter_->getRootFolder());
+    ASSERT_EQ(walks_.size(), 1U);
+    const git_status_options &options = walks_[0].options;
+    EXPECT_EQ(options.show, GIT_STATUS_SHOW_INDEX_AND_WORKDIR);
+    EXPECT_EQ(options.show, 0);
+    EXPECT_EQ(options.flags, 0x95U);
+    EXPECT_EQ(options.flags, static_cast<unsigned>(GIT_STATUS_OPT_INCLUDE_UNTRACKED |
+                                                   GIT_STATUS_OPT_INCLUDE_UNMODIFIED |
+                                                   GIT_STATUS_OPT_RECURSE_UNTRACKED_DIRS |
+                                                   GIT_STATUS_OPT_RENAMES_HEAD_TO_INDEX));
+    EXPECT_EQ(options.baseline, nullptr);
+    EXPECT_TRUE(walks_[0].hasCallback);
+    EXPECT_TRUE(walks_[0].hasPayload);
+    if (vclink::test::libgit2Release::setsRenameThreshold)
+    {
+        EXPECT_EQ(options.rename_threshold, initialised.rename_threshold);
+    }
+    EXPECT_EQ(options.version, 1U);
+    EXPECT_EQ(options.version, initialised.version);
+    EXPECT_EQ(options.baseline, initialised.baseline);
+}
+
+TEST_F(StatusRecord, HasTheWholeListInOneWalk)
+{
+    adapter_->getFileStates({asPath(repository_ / "z"), asPath(repository_ / "sub/a"),
+                             asPath(repository_ / "#b"), asPath(repository_ / "z")});
+    ASSERT_EQ(walks_.size(), 1U);
+    EXPECT_THAT(walks_[0].pathspec, ElementsAre("z", "sub/a", "[#]b", "z"));
+    EXPECT_EQ(walks_[0].options.flags, 0x95U);
+}
+
+TEST_F(StatusRecord, HasOnePatternForAFolder)
+{
+    adapter_->getFolderStates(asPath(repository_ / "sub/dir"));
+    adapter_->getFolderStates(adapter_->getRootFolder());
+    ASSERT_EQ(walks_.size(), 2U);
+    EXPECT_THAT(walks_[0].pathspec, ElementsAre("sub/dir/*"));
+    EXPECT_THAT(walks_[1].pathspec, ElementsAre("*"));
+    EXPECT_EQ(walks_[0].repository, repository_.path().string() + "/");
+}
+
+TEST_F(StatusRecord, IsNotMadeForAnEmptyList)
+{
+    calls_.clear();
+    EXPECT_TRUE(adapter_->getFileStates({}).empty());
+    EXPECT_THAT(calls_.steps(), ElementsAre());
 }
 
 } // namespace
