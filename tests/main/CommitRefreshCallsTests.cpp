@@ -182,20 +182,6 @@ TEST_F(RefreshOfACommit, PassesOverWhatIsNotCheckedOut)
     EXPECT_THAT(namesIn(), ElementsAre("file", "sub/inside"));
 }
 
-/// The same size, and as far as whole seconds tell the same time.
-TEST_F(RefreshOfACommit, TakesWhatIsSavedAfterAPathIsStaged)
-{
-    repository_.write("file", "changed\n");
-    startNoting();
-    calls_->on<git_index_update_all>(
-        [this](git_index *, const git_strarray *, git_index_matched_path_cb, void *)
-        { repository_.write("file", "CHANGED\n"); });
-    commitOnce();
-    EXPECT_THAT(calls_->steps(), Contains("git_index_add_bypath"));
-    EXPECT_EQ(committed("file"), "CHANGED\n");
-    EXPECT_THAT(status(), IsEmpty());
-}
-
 /// libgit2's own comparison of such a file ends the process.
 TEST_F(RefreshOfACommit, TakesAnEmptiedFileThatIsConverted)
 {
