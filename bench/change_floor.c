@@ -46,19 +46,6 @@ static void commit(const char *root)
     git_repository_free(repository);
 }
 
-/// Hashes and stores the listed files.
-static void store(const char *root, git_strarray names)
-{
-    git_repository *const repository = openRepository(root);
-    for (size_t i = 0; i < names.count; ++i)
-    {
-        git_oid id;
-        check(git_blob_create_from_workdir(&id, repository, names.strings[i]),
-              "git_blob_create_from_workdir");
-    }
-    git_repository_free(repository);
-}
-
 static void revert(const char *root, git_strarray names)
 {
     size_t calls = 0;
@@ -89,10 +76,6 @@ static void measure(const char *operation, const char *root, const char *listFil
     {
         revert(root, names);
     }
-    else if (strcmp(operation, "store") == 0)
-    {
-        store(root, names);
-    }
     else
     {
         commit(root);
@@ -122,6 +105,6 @@ static void measureChild(const char *operation, const char *root, const char *li
 
 int main(int argc, char **argv)
 {
-    return runFloor(argc, argv, "change_floor [child] add|commit|revert|store ROOT LIST", measure,
+    return runFloor(argc, argv, "change_floor [child] add|commit|revert ROOT LIST", measure,
                     measureChild);
 }

@@ -12,7 +12,6 @@ import sys
 import working_copies
 from branches import BranchBench
 from changes import ChangeBench
-from commits import SPARSE, CommitBench
 from programs import COUNTS, Programs, Ratios
 from remotes import RemoteBench
 from report import Table, write_into
@@ -44,8 +43,6 @@ class Bench:
     def __init__(self, build, scratch, sizes):
         self._programs = Programs(build, scratch)
         self._changes = ChangeBench(self._programs, scratch)
-        self._commits = CommitBench(
-            self._programs, scratch, [size for size in SPARSE if size <= 2 * max(sizes)])
         self._branches = BranchBench(self._programs, scratch)
         self._remotes = RemoteBench(self._programs, scratch)
         self._sizes = sizes
@@ -67,7 +64,6 @@ class Bench:
             for count in LISTS:
                 working_copies.write_list(self._list(size, count), count, size)
         self._changes.make_working_copies(env)
-        self._commits.make_working_copies(env)
         self._branches.make_working_copies(env)
         self._remotes.make_working_copies(env)
 
@@ -85,7 +81,6 @@ class Bench:
         some = self._roots[self._sizes[0]]
         tasks = {
             **self._changes.tasks(),
-            **self._commits.tasks(),
             **self._branches.tasks(),
             **self._remotes.tasks(),
             ("less", "instructions"): lambda: programs.instructions(
@@ -129,14 +124,12 @@ class Bench:
             self._rounds[size, count] = self._programs.clock(
                 [("floor", *arguments), ("library", *arguments)], LIST_ROUNDS)
         self._changes.clock()
-        self._commits.clock()
         self._branches.clock()
         self._remotes.clock()
 
     def tables(self):
         return [self._folder_table(), self._files_table(),
-                self._changes.table(self._counted), *self._commits.tables(self._counted),
-                self._branches.table(self._counted),
+                self._changes.table(self._counted), self._branches.table(self._counted),
                 self._remotes.table(self._counted), self._small_table()]
 
     def _per_file(self, program):
