@@ -17,7 +17,6 @@
 #include "main/files/GitAdapter.hpp"
 #include "main/files/commitIdentity.hpp"
 #include "main/files/indexRefresh.hpp"
-#include "main/files/stageChangedFiles.hpp"
 #include "main/mergeState/MergeMarker.hpp"
 #include "main/mergeState/interruptedMerge.hpp"
 #include "main/mergeState/mergeHead.hpp"
@@ -120,15 +119,13 @@ void GitAdapter::refreshForCommit(git_repository *repository, git_index *index,
                                   const git_commit *head,
                                   const std::vector<const git_commit *> &parents) const
 {
-    HeldEntries held;
-    stageChangedFiles(repository, index, held);
     const CommitSubmodules submodules(repository, index, parents);
     submodules.resolve(index);
     if (expectedMerge_ != nullptr)
     {
         submodules.takeOut(index);
     }
-    refreshIndex(repository, index, held);
+    refreshIndex(repository, index);
     // Where HEAD can't be read, nothing tells which commit the user has checked out on purpose.
     const std::size_t ours = head != nullptr ? 1 : 0;
     if (expectedMerge_ != nullptr || parents.size() > ours)

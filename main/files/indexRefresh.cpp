@@ -88,14 +88,22 @@ void refuseUnreadable(const std::string &workdir, const std::string &path)
     }
 }
 
-void refuseUnreadableAmongDropped(git_repository *repository, git_index *index, git_index *before)
+void restoreDropped(git_repository *repository, git_index *index, git_index *before)
 {
     const std::string workdir = git_repository_workdir(repository);
     const std::size_t count = git_index_entrycount(before);
     for (std::size_t i = 0; i < count; ++i)
     {
         const git_index_entry *const entry = git_index_get_byindex(before, i);
-        if (!isIndexed(index, entry->path))
+        if (isIndexed(index, entry->path))
+        {
+            continue;
+        }
+        if ((entry->flags_extended & GIT_INDEX_ENTRY_SKIP_WORKTREE) != 0)
+        {
+            check(git_index_add, index, entry);
+        }
+        else
         {
             refuseUnreadable(workdir, entry->path);
         }
@@ -104,18 +112,14 @@ void refuseUnreadableAmongDropped(git_repository *repository, git_index *index, 
 
 } // namespace
 
-void refreshIndex(git_repository *repository, git_index *index, HeldEntries &held)
+void refreshIndex(git_repository *repository, git_index *index)
 {
-    // Something missing in the store makes the refresh fail, too, with a text that says so.
-    const GitResult<void> leftOut = held.holdLeftOut(index);
     const std::size_t countBefore = git_index_entrycount(index);
     check(git_index_update_all, index, nullptr, nullptr, nullptr);
-    check(leftOut);
-    held.giveBack(index);
     if (git_index_entrycount(index) < countBefore)
     {
         const OwnedHandle<git_index> before = openIndex(git_index_path(index));
-        refuseUnreadableAmongDropped(repository, index, before.get());
+        restoreDropped(repository, index, before.get());
     }
 }
 

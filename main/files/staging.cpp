@@ -7,7 +7,6 @@
 #include "error/raise.hpp"
 #include "fl/filesystem/operations.hpp"
 #include "main/files/GitAdapter.hpp"
-#include "main/files/holdChangedFiles.hpp"
 #include "util/lock/IndexLock.hpp"
 #include "util/path/PathspecArray.hpp"
 #include "util/repository/repository.hpp"
@@ -90,11 +89,8 @@ void GitAdapter::addToIndex(const std::vector<upath> &files)
     IndexLock lock(repository.get());
     const OwnedHandle<git_index> index = getRepositoryIndex(repository.get());
     const PathspecArray pathspec = makeFilePathspec(files, root_);
-    HeldEntries held;
-    holdChangedFiles(repository.get(), index.get(), pathspec.array(), held);
     check(git_index_add_all, index.get(), getArrayPointer(pathspec), GIT_INDEX_ADD_DEFAULT,
           acceptAllPaths, this);
-    held.giveBack(index.get());
     writeIndex(index.get());
     lock.publish();
 }

@@ -3,7 +3,6 @@
 
 #include <algorithm>
 #include <array>
-#include <chrono>
 #include <cstdlib>
 #include <filesystem>
 #include <iterator>
@@ -40,21 +39,6 @@ void copyTree(const fs::path &source, const fs::path &target)
         else
             fs::copy(entry.path(), copy, fs::copy_options::copy_symlinks);
     }
-}
-
-/// So that, whenever they are copied, it does not depend on the second which of them the library
-/// has to look at twice.
-void dateIntoTheFuture(const GitRepository &repository)
-{
-    const auto future = fs::file_time_type::clock::now() + std::chrono::hours(24 * 365);
-    for (fs::recursive_directory_iterator entry(repository.path()), end; entry != end; ++entry)
-    {
-        if (entry->path().filename() == ".git")
-            entry.disable_recursion_pending();
-        else if (!entry->is_symlink() && entry->is_regular_file())
-            fs::last_write_time(entry->path(), future);
-    }
-    repository.tryGit({"update-index", "-q", "--unmerged", "--refresh"});
 }
 
 bool begins(const std::string &text, const std::string &beginning)
@@ -112,7 +96,6 @@ Trial::Trial(const Operation &operation, fs::path folder, const HermeticEnvironm
     // For the operations that make an identity of it; the environment is put back by its owner.
     ::setenv("USER", "builder", 1);
     operation_.prepare(repository_);
-    dateIntoTheFuture(repository_);
     copyTree(folder_ / "subject", folder_ / "saved");
     const Action action = begin();
     beginning_ = files();

@@ -76,8 +76,6 @@ const std::vector<Unexamined> &allUnexamined()
         {"", "git_attr_cache_flush"},
         {"", "git_oid_cpy"},
         {"", "git_oid_fmt"},
-        {"", "git_index_caps"},
-        {"", "git_pathspec_matches_path"},
         {"merge", "git_merge_analysis"},
         {"merge", "git_attr_get"},
     };
@@ -123,11 +121,10 @@ std::vector<Tolerance> tolerancesOfCommits(const std::string &operation, const s
         {"commitUnreadable", "git_index_find", 1, GIT_ENOTFOUND, missed("file")},
         {"commitUnreadable", "git_index_find", 2, GIT_ENOTFOUND, missed("other")},
         {"commitUnreadable", "git_index_find", any, GIT_ENOTFOUND, normal},
-        // The refresh takes the files that can't be taken by their paths.
-        {"commit", "git_diff_index_to_workdir", any, any, normal},
-        {"merge", "git_diff_index_to_workdir", any, any, normal},
-        {"commit", "git_index_add_bypath", any, any, normal},
-        {"commit", "git_index_remove_bypath", any, any, normal},
+        {"commit", "git_index_find", 1, GIT_ENOTFOUND, missed("file")},
+        {"commit", "git_index_find", 3, GIT_ENOTFOUND, missed("staged")},
+        {"commit", "git_index_find", 4, GIT_ENOTFOUND, missed("sub/inside")},
+        {"commit", "git_index_find", any, GIT_ENOTFOUND, normal},
         // The text of the failure is the injected one then.
         {"commit", "git_error_set_str", any, any, failure(GIT_ERROR, GIT_ERROR_OS, injectedText)},
     };
@@ -145,9 +142,6 @@ std::vector<Tolerance> tolerancesOfOthers(const std::string &operation, const st
     return {
         // Only a missing folder is no failure of a probe.
         {"isAdapterFor", "git_repository_open_ext", any, GIT_ENOTFOUND, "done: 0"},
-        // What can't be held is compared.
-        {"addFiles", "git_index_add", 1, any, normal},
-        {"addFiles", "git_index_add", 2, any, normal},
         // Without a HEAD the files are taken out of the index.
         {"revert", "git_revparse_single", any, any, normal},
         // The end of a list.

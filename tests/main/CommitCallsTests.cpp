@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: MIT
+#include <algorithm>
 #include <cstddef>
 #include <cstdlib>
+#include <memory>
 #include <ostream>
 #include <string>
 #include <vector>
@@ -9,7 +11,8 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "CommitCallsTest.hpp"
+#include "CommitTest.hpp"
+#include "support/libgit2/LibGit2Recorder.hpp"
 
 namespace
 {
@@ -20,12 +23,31 @@ using testing::IsEmpty;
 using testing::Not;
 using vclink::test::Failure;
 using vclink::test::failureOf;
+using vclink::test::LibGit2Recorder;
 using vclink::test::NothingChanges;
 using vclink::test::RepositoryState;
 using vclink::test::stateOf;
 
-class CommitCalls : public vclink::test::CommitCallsTest
+class CommitCalls : public vclink::test::CommitTest
 {
+  protected:
+    CommitCalls()
+    {
+        adapter_ = makeAdapter(repository_.path());
+    }
+
+    void commitOnce()
+    {
+        adapter_->commit(upath(), u"message");
+    }
+    void startNoting()
+    {
+        calls_.reset();
+        calls_ = std::make_unique<LibGit2Recorder>();
+    }
+
+    std::unique_ptr<vclink::git::GitAdapter> adapter_;
+    std::unique_ptr<LibGit2Recorder> calls_;
 };
 
 TEST_F(CommitCalls, ComeInTheirOrderAndReleaseInReverse)
@@ -84,6 +106,23 @@ TEST_F(CommitCalls, MakeAnIdentityOnlyWhereNoneIsConfigured)
     EXPECT_EQ(calls_->steps().at(11), "git_repository_index");
 }
 
+TEST_F(CommitCalls, RefreshTheWholeIndexWithoutACallback)
+{
+    int count = 0;
+    startNoting();
+    calls_->on<git_index_update_all>(
+        [&](git_index *, const git_strarray *pathspec, git_index_matched_path_cb callback,
+            void *payload)
+        {
+            ++count;
+            EXPECT_EQ(pathspec, nullptr);
+            EXPECT_EQ(callback, nullptr);
+            EXPECT_EQ(payload, nullptr);
+        });
+    commitOnce();
+    EXPECT_EQ(count, 1);
+}
+
 TEST_F(CommitCalls, AskForTheCommitAtHead)
 {
     std::vector<std::string> asked;
@@ -112,6 +151,69 @@ TEST_F(CommitCalls, GiveOneSignatureTwiceAndTheEncodingAlways)
         });
     commitOnce();
     EXPECT_EQ(count, 1);
+}
+
+TEST_F(CommitCalls, ReadTheIndexFileAgainOnlyWhenAnEntryIsGone)
+{
+    startNoting();
+    repository_.write("file", "changed\n");
+    repository_.write("new", "x");
+    commitOnce();
+    // Once for the lock.
+    EXPECT_THAT(calls_->steps(), Contains("git_index_open").Times(1));
+    startNoting();
+    repository_.remove("file");
+    commitOnce();
+    EXPECT_THAT(calls_->steps(), Contains("git_index_open").Times(2));
+    EXPECT_THAT(calls_->steps(), Not(Contains("git_index_add")));
+    EXPECT_THAT(calls_->openHandles(), IsEmpty());
+}
+
+TEST_F(CommitCalls, ReadTheIndexFileAgainBeforeTheyWriteIt)
+{
+    repository_.remove("file");
+    startNoting();
+    commitOnce();
+    auto steps = calls_->steps();
+    const auto lookUps = std::remove(steps.begin(), steps.end(), "git_index_find");
+    EXPECT_EQ(steps.end() - lookUps, 3) << "once for each entry that was there";
+    steps.erase(lookUps, steps.end());
+    ASSERT_GE(steps.size(), 15U);
+    EXPECT_THAT(std::vector<std::string>(steps.begin() + 10, steps.begin() + 15),
+                ElementsAre("git_repository_index", "git_index_update_all", "git_index_open",
+                            "git_index_free", "git_index_write"));
+}
+
+TEST_F(CommitCalls, PutBackOnlyWhatIsNotCheckedOut)
+{
+    repository_.git({"update-index", "--skip-worktree", "file", "sub/inside"});
+    for (const auto *name : {"file", "sub/inside", "other"})
+        repository_.remove(name);
+    startNoting();
+    commitOnce();
+    EXPECT_THAT(calls_->steps(), Contains("git_index_add").Times(2));
+    EXPECT_THAT(namesIn(), ElementsAre("file", "sub/inside"));
+}
+
+TEST_F(CommitCalls, PutBackNothingThatIsStillThere)
+{
+    repository_.git({"update-index", "--skip-worktree", "file", "other"});
+    repository_.remove("file");
+    startNoting();
+    commitOnce();
+    EXPECT_THAT(calls_->steps(), Contains("git_index_add").Times(1));
+    EXPECT_THAT(namesIn(), ElementsAre("file", "other", "sub/inside"));
+}
+
+/// Three stages become one entry, and none is gone.
+TEST_F(CommitCalls, PutNothingBackWhenAConflictEnds)
+{
+    beginMerge({"file"});
+    startNoting();
+    commitOnce();
+    EXPECT_THAT(calls_->steps(), Contains("git_index_open").Times(2));
+    EXPECT_THAT(calls_->steps(), Not(Contains("git_index_add")));
+    EXPECT_THAT(namesIn(), ElementsAre("file", "other", "sub/inside"));
 }
 
 /// HEAD can't be told for whatever reason: libgit2 tells it when the commit is made.
@@ -269,6 +371,18 @@ TEST_F(CommitCalls, RaiseEveryOtherFailureOfTheConfiguredIdentity)
     calls_->fail({{"git_signature_default", GIT_ENOTFOUND}});
     commitOnce();
     EXPECT_THAT(calls_->steps(), Contains("git_signature_now"));
+}
+
+TEST_F(CommitCalls, RaiseAFailureToPutBackWhatIsNotCheckedOut)
+{
+    repository_.git({"update-index", "--skip-worktree", "file"});
+    repository_.remove("file");
+    repository_.write("other", "changed\n");
+    const NothingChanges nothing(repository_);
+    startNoting();
+    calls_->fail({{"git_index_add", -42}});
+    EXPECT_EQ(failureOf([this] { commitOnce(); }), (Failure{-42, GIT_ERROR_OS, "injected"}));
+    EXPECT_THAT(calls_->openHandles(), IsEmpty());
 }
 
 } // namespace

@@ -26,25 +26,6 @@ class MarkResolved : public vclink::test::StagingTest
 {
 };
 
-TEST_F(MarkResolved, StagesAnEmptiedFileThatIsConverted)
-{
-    repository_.write(".gitattributes", "* text\n");
-    repository_.commitAll("attributes");
-    repository_.write("file", "");
-    const auto expected = stateAfterGit({{"add", "file"}});
-    markResolved("file");
-    EXPECT_EQ(stateOf(repository_), expected);
-}
-
-TEST_F(MarkResolved, ReplacesATrackedFolderThatIsGone)
-{
-    repository_.remove("sub");
-    repository_.write("sub", "x");
-    const auto expected = stateAfterGit({{"add", "sub"}});
-    markResolved("sub");
-    EXPECT_EQ(stateOf(repository_), expected);
-}
-
 TEST_F(MarkResolved, PutsTheFileAsItStandsIntoThePlaceOfAConflict)
 {
     beginMerge({"conflicted", "left"});

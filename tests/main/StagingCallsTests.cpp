@@ -96,37 +96,6 @@ TEST_F(StagingCalls, OfAnAdditionFollowThoseOfTheQuery)
     EXPECT_THAT(calls_.openHandles(), IsEmpty());
 }
 
-/// libgit2 makes a text comparison of each changed file.
-TEST_F(StagingCalls, OfAnAdditionHoldWhatElseHasChanged)
-{
-    repository_.write("file", "changed and longer\n");
-    repository_.remove("other");
-    const auto expected = vclink::test::indexOf(repository_);
-    add({"new"});
-    const Names hold{"git_pathspec_matches_path", "git_index_add"};
-    const Names prepare =
-        Names{"git_pathspec_new", "git_index_caps"} + hold + hold + Names{"git_pathspec_free"};
-    const Names addition{"git_index_add_all", "git_index_add", "git_index_add", "git_index_write"};
-    EXPECT_EQ(calls_.steps(), ofTheQuery + ofTheLock + Names{"git_repository_index"} + prepare +
-                                  addition + ofTheEnd);
-    EXPECT_THAT(calls_.openHandles(), IsEmpty());
-    auto after = vclink::test::indexOf(repository_);
-    EXPECT_EQ(after.erase("new"), 1U);
-    EXPECT_EQ(after, expected);
-}
-
-TEST_F(StagingCalls, OfAnAdditionGoOnWithoutHoldingWhatCannotBeHeld)
-{
-    repository_.write("file", "changed and longer\n");
-    const auto expected = vclink::test::indexOf(repository_);
-    calls_.fail({{"git_index_add", -42}});
-    add({"new"});
-    EXPECT_THAT(calls_.steps(), testing::Contains("git_index_read").Times(1));
-    auto after = vclink::test::indexOf(repository_);
-    EXPECT_EQ(after.erase("new"), 1U);
-    EXPECT_EQ(after, expected);
-}
-
 TEST_F(StagingCalls, OfARemovalFollowThoseOfTheQuery)
 {
     remove({"file"});

@@ -112,21 +112,6 @@ TEST_F(StagingFailure, OfAnUntrackedRepositoryWithinChangesNothing)
     EXPECT_EQ(failureOf([this] { markResolved("nested"); }).code, GIT_ERROR);
 }
 
-/// libgit2's own comparison of such a file ends the process.
-TEST_F(StagingFailure, DoesNotComeOfAnEmptiedFileThatIsConverted)
-{
-    repository_.write(".gitattributes", "* text\n");
-    repository_.commitAll("attributes");
-    repository_.write("another", "x");
-    repository_.write("file", "");
-    repository_.write("other", "changed\n");
-    repository_.remove("sub/inside");
-    const RepositoryState expected = stateAfterGit({{"add", "another"}});
-    add({"another"});
-    EXPECT_EQ(stateOf(repository_), expected);
-    EXPECT_THAT(status(), ElementsAre("A  another", " M file", " M other", " D sub/inside"));
-}
-
 TEST_F(StagingFailure, OfLineEndsThatWouldBeLostChangesNothing)
 {
     repository_.git({"config", "core.safecrlf", "true"});
