@@ -14,12 +14,6 @@
 namespace vclink::test
 {
 
-using LibGit2Failure = Failure;
-inline Failure libGit2FailureOf(const std::function<void()> &action)
-{
-    return failureOf(action);
-}
-
 /// A message's text in the language of the process.
 std::string textOf(const resource_core::BaseMsgID &message);
 /// The text of a LibGit2Exception with this failure.

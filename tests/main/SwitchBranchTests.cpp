@@ -210,7 +210,7 @@ TEST_F(SwitchBranch, FailsWhereTheRepositoryCannotBeOpened)
 TEST_F(SwitchBranch, IsRefusedIfAnotherWorkingCopyHasTheBranch)
 {
     repository_.git({"worktree", "add", "--quiet", "../other copy", "topic"});
-    const vclink::test::LibGit2Failure failure{
+    const vclink::test::Failure failure{
         GIT_ERROR, GIT_ERROR_REPOSITORY,
         "cannot set HEAD to reference 'refs/heads/topic' as it is the "
         "current HEAD of a linked repository."};
@@ -218,7 +218,7 @@ TEST_F(SwitchBranch, IsRefusedIfAnotherWorkingCopyHasTheBranch)
     repository_.git({"checkout", "--quiet", "--detach"});
     {
         const NothingChanges nothing(repository_);
-        EXPECT_EQ(libGit2FailureOf([this] { switchTo("topic"); }), failure);
+        EXPECT_EQ(failureOf([this] { switchTo("topic"); }), failure);
     }
     switchTo("main");
     switchTo("main");

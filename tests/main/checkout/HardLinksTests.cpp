@@ -108,7 +108,7 @@ TEST_F(HardLinks, AreLeftIfTheCheckoutIsRefused)
                });
     linkOutside("file");
     repository_.write("zz", "mine\n");
-    EXPECT_EQ(vclink::test::libGit2FailureOf([this] { branches().switchBranch("topic"); }).code,
+    EXPECT_EQ(vclink::test::failureOf([this] { branches().switchBranch("topic"); }).code,
               GIT_ECONFLICT);
     EXPECT_TRUE(fs::equivalent(repository_ / "file", outside_ / "file"));
 }
@@ -121,10 +121,8 @@ TEST_F(HardLinks, InAFolderThatCannotBeWrittenToAreRefused)
     giveToUnprivilegedUser(folder().path());
     repository_.setMode("d", 0555);
     const std::string text = runAsUnprivilegedUser(
-        [this] {
-            return vclink::test::libGit2FailureOf([this] { branches().switchBranch("topic"); })
-                .text;
-        });
+        [this]
+        { return vclink::test::failureOf([this] { branches().switchBranch("topic"); }).text; });
     repository_.setMode("d", 0755);
     EXPECT_EQ(text, "the file 'd/f' has further names, and its folder cannot be written to");
     EXPECT_EQ(readOutside("f"), "f\n");

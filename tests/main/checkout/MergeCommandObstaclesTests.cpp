@@ -23,7 +23,7 @@ class MergeCommandObstacles : public vclink::test::DrivenMergeTest
     {
         const std::string head = idOf("HEAD");
         const auto index = vclink::test::indexOf(repository_);
-        EXPECT_EQ(failureOfMerge("topic"), vclink::test::textOf(vclink::test::LibGit2Failure{
+        EXPECT_EQ(failureOfMerge("topic"), vclink::test::textOf(vclink::test::Failure{
                                                GIT_ECONFLICT, GIT_ERROR_CHECKOUT, text}));
         EXPECT_EQ(idOf("HEAD"), head);
         EXPECT_EQ(vclink::test::indexOf(repository_), index);

@@ -57,15 +57,15 @@ class ObstacleTest : public MergeTest
         for (const auto *name : {"outside/f", "outside/g", "outside/new"})
             EXPECT_EQ(repository_.read(std::string("../") + name), "precious\n");
     }
-    static LibGit2Failure refusal(const std::string &text)
+    static Failure refusal(const std::string &text)
     {
         return {GIT_ECONFLICT, GIT_ERROR_CHECKOUT, text};
     }
-    static LibGit2Failure inTheWay(const std::string &what)
+    static Failure inTheWay(const std::string &what)
     {
         return refusal("the " + what + " is in the way of the checkout");
     }
-    static LibGit2Failure inChangedFolder(const std::string &what)
+    static Failure inChangedFolder(const std::string &what)
     {
         return refusal("the " + what + " is in a folder that becomes a file");
     }
@@ -80,14 +80,12 @@ class ObstacleTest : public MergeTest
         EXPECT_EQ(branches().getRepositoryState(), "Normal");
         expectNothingOutsideChanged();
     }
-    void expectSwitchRefused(const LibGit2Failure &failure,
-                             const std::string &branch = "topic") const
+    void expectSwitchRefused(const Failure &failure, const std::string &branch = "topic") const
     {
         expectNothingChanges(
-            [&]
-            { EXPECT_EQ(libGit2FailureOf([&] { branches().switchBranch(branch); }), failure); });
+            [&] { EXPECT_EQ(failureOf([&] { branches().switchBranch(branch); }), failure); });
     }
-    void expectMergeRefused(const LibGit2Failure &failure) const
+    void expectMergeRefused(const Failure &failure) const
     {
         expectNothingChanges([&] { EXPECT_EQ(failureOfMerge("topic"), textOf(failure)); });
     }

@@ -16,8 +16,8 @@ namespace
 namespace git = vclink::git;
 using testing::ElementsAre;
 using testing::IsEmpty;
+using vclink::test::Failure;
 using vclink::test::GitRepository;
-using vclink::test::LibGit2Failure;
 using vclink::test::makeFifo;
 
 /// Switches, fast-forwards and merges between branches with and without the submodule "module".
@@ -60,12 +60,12 @@ class SubmoduleObstacles : public vclink::test::ObstacleTest
         branches().switchBranch(name);
         EXPECT_EQ(currentBranch(), "refs/heads/" + name);
     }
-    void expectRefused(const LibGit2Failure &failure, const std::string &branch) const
+    void expectRefused(const Failure &failure, const std::string &branch) const
     {
         expectSwitchRefused(failure, branch);
         expectNothingChanges([&] { EXPECT_EQ(failureOfMerge(branch), textOf(failure)); });
     }
-    static LibGit2Failure staged(const std::string &name)
+    static Failure staged(const std::string &name)
     {
         return refusal("the staged changes of '" + name + "' would be lost in the checkout");
     }
@@ -274,7 +274,7 @@ TEST_F(SubmoduleObstacles, OfAForcedSwitchAreFoldersOfSubmodules)
         expectNothingChanges(
             [&]
             {
-                EXPECT_EQ(vclink::test::libGit2FailureOf(
+                EXPECT_EQ(vclink::test::failureOf(
                               [&] { git::BranchManager::create(adapter)->switchBranch(branch); }),
                           inTheWay("folder 'module'"));
             });

@@ -20,9 +20,9 @@ namespace fs = std::filesystem;
 namespace git = vclink::git;
 using testing::ElementsAre;
 using testing::IsEmpty;
+using vclink::test::Failure;
+using vclink::test::failureOf;
 using vclink::test::GitRepository;
-using vclink::test::LibGit2Failure;
-using vclink::test::libGit2FailureOf;
 using vclink::test::makeFifo;
 using vclink::test::makeSocket;
 using vclink::util::exception::CancelledOperationException;
@@ -43,7 +43,7 @@ class SwitchObstacles : public vclink::test::ObstacleTest
                    });
     }
     /// Expects that the switch and the fast-forward are refused.
-    void expectRefused(const LibGit2Failure &failure) const
+    void expectRefused(const Failure &failure) const
     {
         expectSwitchRefused(failure);
         expectMergeRefused(failure);
@@ -253,7 +253,7 @@ TEST_F(SwitchObstacles, AreFilesOfAWorkingCopyThatWasNeverCheckedOut)
     makeTopic(writing("d/f", "theirs\n"));
     repository_.remove(".git/index");
     repository_.write("other", "mine\n");
-    EXPECT_EQ(libGit2FailureOf([this] { branches().switchBranch("topic"); }).code, GIT_ECONFLICT);
+    EXPECT_EQ(failureOf([this] { branches().switchBranch("topic"); }).code, GIT_ECONFLICT);
     EXPECT_EQ(repository_.read("other"), "mine\n");
     EXPECT_EQ(currentBranch(), "refs/heads/main");
 }

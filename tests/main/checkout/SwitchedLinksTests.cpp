@@ -18,7 +18,7 @@ namespace fs = std::filesystem;
 using testing::ElementsAre;
 using testing::HasSubstr;
 using testing::IsEmpty;
-using vclink::test::LibGit2Failure;
+using vclink::test::Failure;
 using vclink::test::NothingChanges;
 using vclink::test::stateOf;
 using vclink::util::exception::CancelledOperationException;
@@ -56,7 +56,7 @@ class SwitchedLinks : public vclink::test::SwitchBranchTest
         repository_.remove("dir");
         repository_.symlink("../outside/dir", "dir");
     }
-    static LibGit2Failure inTheWay(const std::string &name)
+    static Failure inTheWay(const std::string &name)
     {
         return {GIT_ECONFLICT, GIT_ERROR_CHECKOUT,
                 "the symbolic link '" + name + "' is in the way of the checkout"};
