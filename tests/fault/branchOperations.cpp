@@ -85,6 +85,11 @@ void switchBranch(BranchManager &branches)
     branches.switchBranch("topic");
 }
 
+void switchToCurrentBranch(BranchManager &branches)
+{
+    branches.switchBranch("main");
+}
+
 void createBranch(BranchManager &branches)
 {
     branches.createBranch(git::BranchParameters("fresh", "topic"));
@@ -121,6 +126,7 @@ std::vector<Operation> branchOperations()
         {"getCurrentBranch", makeBranches, asking(getCurrentBranch), "", {}, false},
         {"getRepositoryState", makeConflicted, asking(getRepositoryState), "", {}, false},
         {"switchBranch", makeBranches, doing(switchBranch), refused, abort},
+        {"switchToCurrentBranch", makeBranches, doing(switchToCurrentBranch), refused, abort},
         {"switchBranchUnderLink", makeLinkedFolder, doing(switchBranch), refused, abort},
         {"switchBranchWithSubmodules", makeSubmodules, doing(switchBranch), refused, abort},
         {"createBranch", makeBranches, doing(createBranch), refused, {{"branch", "-D", "fresh"}}},
