@@ -16,7 +16,7 @@
 #include "Workplace.hpp"
 #include "differential/Comparison.hpp"
 #include "differential/Random.hpp"
-#include "support/GitTest.hpp"
+#include "support/GitFixture.hpp"
 #include "support/LibGit2Session.hpp"
 
 namespace
@@ -25,7 +25,7 @@ namespace
 using std::chrono::microseconds;
 using vclink::test::Casualty;
 using vclink::test::Comparison;
-using vclink::test::GitTest;
+using vclink::test::GitFixture;
 using vclink::test::InterruptedMerge;
 using vclink::test::LibGit2Session;
 using vclink::test::Random;
@@ -43,7 +43,7 @@ std::uint64_t numberFrom(const char *variable, std::uint64_t otherwise)
 
 /// Workers that are killed one after the other. VCLINK_KILLS says how many, VCLINK_SEED when. With
 /// VCLINK_KEEP the workplace of a test that fails stays, beside where the test's folder was.
-class Crash : public GitTest
+class Crash : public GitFixture
 {
   protected:
     using Counts = std::map<std::string, std::size_t>;

@@ -6,7 +6,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "DesktopTest.hpp"
+#include "DesktopFixture.hpp"
 #include "support/Scripts.hpp"
 #include "text.hpp"
 
@@ -18,7 +18,7 @@ using testing::HasSubstr;
 using vclink::desktop::fromUtf8;
 using vclink::desktop::toUtf8;
 
-class BranchCommands : public DesktopTest
+class BranchCommands : public DesktopFixture
 {
   protected:
     BranchCommands()
@@ -36,7 +36,7 @@ class BranchCommands : public DesktopTest
     }
     void choose(const std::string &command, const QStringList &values)
     {
-        DesktopTest::choose(command);
+        DesktopFixture::choose(command);
         fill(values);
         settle();
     }

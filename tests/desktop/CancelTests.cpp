@@ -10,7 +10,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "DesktopTest.hpp"
+#include "DesktopFixture.hpp"
 #include "text.hpp"
 
 namespace
@@ -20,7 +20,7 @@ using namespace vclink::test;
 using testing::HasSubstr;
 using vclink::desktop::toUtf8;
 
-class Cancel : public DesktopTest
+class Cancel : public DesktopFixture
 {
   protected:
     Cancel()

@@ -7,7 +7,7 @@
 #include <gtest/gtest.h>
 
 #include "ConflictDialog.hpp"
-#include "DesktopTest.hpp"
+#include "DesktopFixture.hpp"
 #include "fl/filesystem/operations.hpp"
 #include "support/Scripts.hpp"
 #include "text.hpp"
@@ -20,7 +20,7 @@ using namespace vclink::test;
 using testing::HasSubstr;
 using vclink::desktop::ConflictDialog;
 
-class Conflicts : public DesktopTest
+class Conflicts : public DesktopFixture
 {
   protected:
     Conflicts()

@@ -8,7 +8,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "DesktopTest.hpp"
+#include "DesktopFixture.hpp"
 #include "text.hpp"
 
 namespace
@@ -19,7 +19,7 @@ using testing::HasSubstr;
 using vclink::desktop::FormDialog;
 using vclink::desktop::toUtf8;
 
-class FileCommands : public DesktopTest
+class FileCommands : public DesktopFixture
 {
   protected:
     FileCommands()

@@ -5,7 +5,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "DesktopTest.hpp"
+#include "DesktopFixture.hpp"
 #include "fl/i18n/convert.hpp"
 #include "text.hpp"
 
@@ -16,7 +16,7 @@ using namespace vclink::test;
 using vclink::desktop::toQString;
 using vclink::desktop::toUstring;
 
-class Names : public DesktopTest, public testing::WithParamInterface<const char *>
+class Names : public DesktopFixture, public testing::WithParamInterface<const char *>
 {
 };
 

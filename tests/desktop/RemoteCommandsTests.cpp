@@ -8,7 +8,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "DesktopTest.hpp"
+#include "DesktopFixture.hpp"
 #include "text.hpp"
 #include "transport/GitDaemon.hpp"
 #include "transport/ScriptedServer.hpp"
@@ -34,7 +34,7 @@ class RunningDaemon
 };
 std::unique_ptr<GitDaemon> RunningDaemon::daemon;
 
-class RemoteCommands : private RunningDaemon, public DesktopTest
+class RemoteCommands : private RunningDaemon, public DesktopFixture
 {
   protected:
     RemoteCommands()
@@ -54,7 +54,7 @@ class RemoteCommands : private RunningDaemon, public DesktopTest
     }
     void choose(const std::string &command, const QStringList &values)
     {
-        DesktopTest::choose(command);
+        DesktopFixture::choose(command);
         fill(values);
     }
 

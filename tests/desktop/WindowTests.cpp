@@ -12,7 +12,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "DesktopTest.hpp"
+#include "DesktopFixture.hpp"
 #include "language.hpp"
 #include "text.hpp"
 
@@ -26,7 +26,7 @@ using testing::Not;
 using vclink::desktop::LogPane;
 using vclink::desktop::toUtf8;
 
-class Window : public DesktopTest
+class Window : public DesktopFixture
 {
   protected:
     Window()

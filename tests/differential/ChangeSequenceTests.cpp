@@ -10,7 +10,7 @@
 #include <gtest/gtest.h>
 
 #include "ChangeSequence.hpp"
-#include "support/GitTest.hpp"
+#include "support/GitFixture.hpp"
 #include "support/LibGit2Session.hpp"
 
 namespace
@@ -34,7 +34,7 @@ std::uint64_t numberFrom(const char *variable, std::uint64_t otherwise)
 /// debug begins where release ends, so that no sequence is run twice. To run one
 /// sequence again, run this program with the seed in VCLINK_SEED; every block is that sequence
 /// alone then. VCLINK_KEEP besides names a path to which its working copies are moved in the end.
-class ChangeSequences : public vclink::test::GitTest,
+class ChangeSequences : public vclink::test::GitFixture,
                         public testing::WithParamInterface<std::uint64_t>
 {
   protected:

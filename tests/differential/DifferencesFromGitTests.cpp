@@ -6,7 +6,7 @@
 #include <git2/errors.h>
 #include <gtest/gtest.h>
 
-#include "support/GitTest.hpp"
+#include "support/GitFixture.hpp"
 #include "support/LibGit2Session.hpp"
 #include "support/TestInteractor.hpp"
 #include "support/text.hpp"
@@ -26,7 +26,7 @@ using vclink::test::asUtf8;
 using vclink::test::GitRepository;
 using States = std::map<std::string, FileState::State>;
 
-class DifferencesFromGit : public vclink::test::GitTest
+class DifferencesFromGit : public vclink::test::GitFixture
 {
   protected:
     /// The states of the whole working copy, by path relative to its root.

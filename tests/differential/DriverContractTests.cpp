@@ -7,7 +7,7 @@
 #include <gtest/gtest.h>
 
 #include "DriverContract.hpp"
-#include "support/GitTest.hpp"
+#include "support/GitFixture.hpp"
 #include "support/LibGit2Session.hpp"
 
 namespace
@@ -15,7 +15,7 @@ namespace
 
 using namespace vclink::test;
 
-class DriverContract : public GitTest, public testing::WithParamInterface<DriverCase>
+class DriverContract : public GitFixture, public testing::WithParamInterface<DriverCase>
 {
   protected:
     LibGit2Session session_{environment()};

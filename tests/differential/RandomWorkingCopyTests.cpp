@@ -11,7 +11,7 @@
 
 #include "Comparison.hpp"
 #include "RandomWorkingCopy.hpp"
-#include "support/GitTest.hpp"
+#include "support/GitFixture.hpp"
 #include "support/LibGit2Session.hpp"
 
 namespace
@@ -36,7 +36,7 @@ int countFailures()
 /// 25 working copies a block. Each failure prints the seed of its copy and what was done to make
 /// it. To make one copy again, run this program with the seed in VCLINK_SEED; every block is that
 /// copy alone then. VCLINK_KEEP besides names a path to which the copy is moved in the end.
-class RandomWorkingCopies : public vclink::test::GitTest,
+class RandomWorkingCopies : public vclink::test::GitFixture,
                             public testing::WithParamInterface<std::uint64_t>
 {
   protected:

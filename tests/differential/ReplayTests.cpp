@@ -17,7 +17,7 @@
 #include "FloorMerge.hpp"
 #include "MergeHistory.hpp"
 #include "mergeDifferences.hpp"
-#include "support/GitTest.hpp"
+#include "support/GitFixture.hpp"
 #include "support/LibGit2Session.hpp"
 #include "support/RepositoryState.hpp"
 #include "support/TestInteractor.hpp"
@@ -77,7 +77,8 @@ void reset(const GitRepository &repository, const std::string &commit)
 /// A history's merges once more: by the library, by libgit2 alone and by git, each in a working
 /// copy of its own. VCLINK_SEED chooses another history than the usual one; VCLINK_KEEP names a
 /// path to which the working copies are moved in the end.
-class MergeReplay : public vclink::test::GitTest, public testing::WithParamInterface<std::uint64_t>
+class MergeReplay : public vclink::test::GitFixture,
+                    public testing::WithParamInterface<std::uint64_t>
 {
   protected:
     MergeReplay()
@@ -312,7 +313,7 @@ TEST_P(MergeReplay, GivesWhatLibGit2GivesAndDiffersFromGitByRuleOnly)
     }
 }
 
-class MergeHistories : public vclink::test::GitTest
+class MergeHistories : public vclink::test::GitFixture
 {
 };
 

@@ -5,7 +5,7 @@
 #include <gtest/gtest.h>
 #include <sys/resource.h>
 
-#include "DiskTest.hpp"
+#include "DiskFixture.hpp"
 
 namespace
 {
@@ -36,7 +36,7 @@ class FileSizeLimit
     rlimit saved_{};
 };
 
-class FileSizeLimited : public vclink::test::DiskTest
+class FileSizeLimited : public vclink::test::DiskFixture
 {
 };
 

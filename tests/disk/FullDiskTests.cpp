@@ -11,7 +11,7 @@
 #include <gtest/gtest.h>
 #include <sys/mount.h>
 
-#include "DiskTest.hpp"
+#include "DiskFixture.hpp"
 
 namespace
 {
@@ -76,7 +76,7 @@ std::string withoutLine(std::string text, const std::string &beginning)
     return text;
 }
 
-class FullDisk : public vclink::test::DiskTest
+class FullDisk : public vclink::test::DiskFixture
 {
   protected:
     const SmallDisk disk_{folder() / "disk"};
@@ -127,7 +127,7 @@ INSTANTIATE_TEST_SUITE_P(Of, FullDisk, testing::ValuesIn(operationsOnTheDisk()),
                          vclink::test::nameOfOperation);
 
 /// The merge tool's temporary files are elsewhere.
-class FullTemporaryFolder : public vclink::test::DiskTest
+class FullTemporaryFolder : public vclink::test::DiskFixture
 {
   protected:
     const SmallDisk disk_{environment().temporary()};

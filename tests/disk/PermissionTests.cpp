@@ -7,7 +7,7 @@
 #include <gtest/gtest.h>
 #include <sys/stat.h>
 
-#include "DiskTest.hpp"
+#include "DiskFixture.hpp"
 
 namespace
 {
@@ -74,7 +74,7 @@ std::string replaced(std::string text, const std::string &from, const std::strin
     return text;
 }
 
-class WithoutPermission : public vclink::test::DiskTest
+class WithoutPermission : public vclink::test::DiskFixture
 {
   protected:
     std::vector<Lack> lacks() const

@@ -10,7 +10,7 @@
 #include <gtest/gtest.h>
 
 #include "error/errorUtil/GitResult.hpp"
-#include "support/GitTest.hpp"
+#include "support/GitFixture.hpp"
 #include "support/LibGit2Session.hpp"
 #include "support/libgit2/LibGit2Recorder.hpp"
 
@@ -33,7 +33,7 @@ static_assert(!std::is_invocable_v<GitDeleters, git_blob *> &&
 static_assert(std::is_empty_v<GitDeleters>, "an owning handle is as large as a pointer");
 static_assert(std::is_same_v<OwnedHandle<git_tree>, std::unique_ptr<git_tree, GitDeleters>>);
 
-class GitDeletersTest : public test::GitTest
+class GitDeletersTest : public test::GitFixture
 {
   protected:
     GitDeletersTest()

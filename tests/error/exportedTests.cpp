@@ -15,7 +15,7 @@
 #include "fl/i18n/VkLocale.hpp"
 #include "fl/i18n/convert.hpp"
 #include "foundation/core/except/Exception.hpp"
-#include "support/GitTest.hpp"
+#include "support/GitFixture.hpp"
 #include "support/LogCapture.hpp"
 #include "support/TestInteractor.hpp"
 #include "support/text.hpp"
@@ -45,7 +45,7 @@ using vclink::test::TestInteractor;
 template <class Tag>
 using TagException = foundation::core::except::Exception<Tag, SourceControlException>;
 
-class Exported : public vclink::test::GitTest
+class Exported : public vclink::test::GitFixture
 {
   protected:
     /// A folder that says of itself that it is a working copy, and is none.

@@ -10,7 +10,7 @@
 
 #include <gtest/gtest.h>
 
-#include "FaultTest.hpp"
+#include "FaultFixture.hpp"
 #include "error/errorUtil/callbackException.hpp"
 #include "support/FailingAllocations.hpp"
 #include "support/NothingLeft.hpp"
@@ -54,7 +54,7 @@ bool isTyped(const std::string &outcome)
                        { return outcome.compare(0, type.size(), type) == 0; });
 }
 
-class FailingAllocation : public vclink::test::FaultTest
+class FailingAllocation : public vclink::test::FaultFixture
 {
   protected:
     /// @return whether the operation came as far as the allocation

@@ -17,7 +17,7 @@
 #include <sys/wait.h>
 
 #include "FailingFiles.hpp"
-#include "FaultTest.hpp"
+#include "FaultFixture.hpp"
 #include "differential/expectedStates.hpp"
 #include "differential/moves.hpp"
 #include "error/errorUtil/callbackException.hpp"
@@ -96,7 +96,7 @@ bool mayDoOtherwise(const std::string &operation)
                        { return operation.compare(0, name.size(), name) == 0; });
 }
 
-class FailingFileCall : public vclink::test::FaultTest
+class FailingFileCall : public vclink::test::FaultFixture
 {
   protected:
     int countCalls()

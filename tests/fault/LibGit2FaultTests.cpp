@@ -13,7 +13,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "FaultTest.hpp"
+#include "FaultFixture.hpp"
 #include "error/errorUtil/callbackException.hpp"
 #include "expectedOutcomes.hpp"
 #include "support/NothingLeft.hpp"
@@ -44,7 +44,7 @@ bool isRelease(const std::string &call)
     return call.size() > end.size() && call.compare(call.size() - end.size(), end.size(), end) == 0;
 }
 
-class FailingLibGit2Call : public vclink::test::FaultTest
+class FailingLibGit2Call : public vclink::test::FaultFixture
 {
   protected:
     /// The sites of the calls that give a code, each once, without a fault.
@@ -142,7 +142,7 @@ TEST_P(FailingLibGit2Call, ComesOutAndLeavesNothing)
     std::cout << "call sites failed: " << sites.size() << ", in " << runs << " runs\n";
 }
 
-class LibGit2Functions : public vclink::test::GitTest
+class LibGit2Functions : public vclink::test::GitFixture
 {
   protected:
     vclink::test::LibGit2Session session_{environment()};

@@ -10,7 +10,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "support/GitTest.hpp"
+#include "support/GitFixture.hpp"
 #include "support/LocaleOfTheProcess.hpp"
 #include "support/TestInteractor.hpp"
 #include "vclink/git/BranchManager.hpp"
@@ -24,7 +24,7 @@ using host_tools::Failure;
 using host_tools::FailureKind;
 using testing::HasSubstr;
 
-class HostFailures : public GitTest
+class HostFailures : public GitFixture
 {
   protected:
     HostFailures()

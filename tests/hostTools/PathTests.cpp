@@ -11,7 +11,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "support/GitTest.hpp"
+#include "support/GitFixture.hpp"
 #include "support/TestInteractor.hpp"
 #include "vclink/git/GitAdapterFactory.hpp"
 
@@ -22,7 +22,7 @@ using namespace vclink::test;
 using testing::ElementsAre;
 using testing::IsEmpty;
 
-class HostPaths : public GitTest
+class HostPaths : public GitFixture
 {
   protected:
     upath pathOf(const std::string &name) const

@@ -8,7 +8,7 @@
 #include <gtest/gtest.h>
 
 #include "fl/filesystem/path.hpp"
-#include "support/GitTest.hpp"
+#include "support/GitFixture.hpp"
 #include "support/TestInteractor.hpp"
 #include "support/text.hpp"
 #include "vclink/CMAdapter.hpp"
@@ -25,7 +25,7 @@ using vclink::test::asPath;
 using vclink::test::GitRepository;
 
 /// "driven" is merged by a command, which takes their side of what would be in conflict otherwise.
-class GuardRecipe : public vclink::test::GitTest
+class GuardRecipe : public vclink::test::GitFixture
 {
   protected:
     GuardRecipe()

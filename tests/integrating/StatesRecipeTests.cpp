@@ -5,7 +5,7 @@
 #include <gtest/gtest.h>
 
 #include "fl/filesystem/path.hpp"
-#include "support/GitTest.hpp"
+#include "support/GitFixture.hpp"
 #include "support/TestInteractor.hpp"
 #include "support/text.hpp"
 #include "vclink/CMAdapter.hpp"
@@ -24,7 +24,7 @@ using vclink::FileState;
 using vclink::test::asPath;
 using vclink::test::GitRepository;
 
-class StatesRecipe : public vclink::test::GitTest
+class StatesRecipe : public vclink::test::GitFixture
 {
   protected:
     bool hasFiles() const

@@ -5,7 +5,7 @@
 
 #include <gtest/gtest.h>
 
-#include "AdapterTest.hpp"
+#include "AdapterFixture.hpp"
 #include "support/text.hpp"
 #include "vclink/git/GitAdapterFactory.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
@@ -23,7 +23,7 @@ using vclink::test::States;
 constexpr int rounds = 50;
 constexpr int threads = 4;
 
-class AdapterThreads : public vclink::test::AdapterTest
+class AdapterThreads : public vclink::test::AdapterFixture
 {
   protected:
     /// Runs the action on several threads at once, each with its number.

@@ -11,8 +11,8 @@
 #include <git2.h>
 #include <gtest/gtest.h>
 
-#include "RemoteTest.hpp"
 #include "error/errorUtil/libgit2Errors.hpp"
+#include "main/remote/RemoteFixture.hpp"
 #include "support/libgit2/LibGit2Recorder.hpp"
 #include "support/libgit2Release.hpp"
 #include "support/text.hpp"
@@ -62,7 +62,7 @@ struct Silence
     std::function<void()> operation;
 };
 
-class EarlierTexts : public vclink::test::RemoteTest
+class EarlierTexts : public vclink::test::RemoteFixture
 {
   protected:
     EarlierTexts()

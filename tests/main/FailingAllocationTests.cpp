@@ -10,7 +10,7 @@
 #include <git2.h>
 #include <gtest/gtest.h>
 
-#include "AdapterTest.hpp"
+#include "AdapterFixture.hpp"
 #include "error/errorUtil/callbackException.hpp"
 #include "support/FailingAllocations.hpp"
 #include "support/libgit2/LibGit2Recorder.hpp"
@@ -24,7 +24,7 @@ using vclink::git::GitAdapterFactory;
 using vclink::git::pendingCallbackException;
 using vclink::test::asPath;
 
-class FailingAllocation : public vclink::test::AdapterTest
+class FailingAllocation : public vclink::test::AdapterFixture
 {
   protected:
     /// Runs the action again and again, each time with a later allocation failing, until none of

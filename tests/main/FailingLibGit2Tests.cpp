@@ -7,7 +7,7 @@
 #include <gtest/gtest.h>
 
 #include "main/libgit2Features.hpp"
-#include "support/GitTest.hpp"
+#include "support/GitFixture.hpp"
 #include "support/LibGit2Session.hpp"
 #include "support/TestInteractor.hpp"
 #include "support/libgit2/LibGit2Recorder.hpp"
@@ -26,7 +26,7 @@ using vclink::git::LibGit2Version;
 using vclink::test::asPath;
 using vclink::test::LibGit2Recorder;
 
-class FailingLibGit2 : public vclink::test::GitTest
+class FailingLibGit2 : public vclink::test::GitFixture
 {
 };
 

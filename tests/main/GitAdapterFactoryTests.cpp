@@ -6,7 +6,7 @@
 #include <git2.h>
 #include <gtest/gtest.h>
 
-#include "AdapterTest.hpp"
+#include "AdapterFixture.hpp"
 #include "support/libgit2Release.hpp"
 #include "support/text.hpp"
 #include "vclink/git/GitAdapterFactory.hpp"
@@ -21,7 +21,7 @@ using vclink::git::LibGit2Exception;
 using vclink::test::asPath;
 using vclink::test::asUtf8;
 
-class GitAdapterFactoryTest : public vclink::test::AdapterTest
+class GitAdapterFactoryTest : public vclink::test::AdapterFixture
 {
   protected:
     std::unique_ptr<vclink::CMAdapter> create(const upath &root) const

@@ -10,7 +10,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "AdapterTest.hpp"
+#include "AdapterFixture.hpp"
 #include "support/LogCapture.hpp"
 #include "support/text.hpp"
 #include "vclink/WorkingCopyGenerator.hpp"
@@ -35,7 +35,7 @@ bool isRegistered()
     return git_merge_driver_lookup("*") != nullptr;
 }
 
-class GuardRegistration : public vclink::test::AdapterTest
+class GuardRegistration : public vclink::test::AdapterFixture
 {
   protected:
     GuardRegistration()

@@ -6,7 +6,7 @@
 #include <gtest/gtest.h>
 
 #include "support/Descriptors.hpp"
-#include "support/GitTest.hpp"
+#include "support/GitFixture.hpp"
 #include "support/LibGit2Session.hpp"
 #include "support/UnprivilegedUser.hpp"
 #include "support/text.hpp"
@@ -41,7 +41,7 @@ std::string probeDirectly(const std::string &path)
     return code == 0 ? "true" : code == GIT_ENOTFOUND ? "false" : std::to_string(code);
 }
 
-class IsAdapterFor : public vclink::test::GitTest
+class IsAdapterFor : public vclink::test::GitFixture
 {
   protected:
     void expectProbe(const std::filesystem::path &path, const std::string &expected) const

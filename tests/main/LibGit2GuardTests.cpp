@@ -7,7 +7,7 @@
 #include <git2.h>
 #include <gtest/gtest.h>
 
-#include "support/GitTest.hpp"
+#include "support/GitFixture.hpp"
 #include "support/LibGit2Session.hpp"
 #include "support/TestInteractor.hpp"
 #include "support/text.hpp"
@@ -24,7 +24,7 @@ using vclink::git::LibGit2Guard;
 using vclink::test::asPath;
 using vclink::test::countLibGit2Starts;
 
-class LibGit2GuardTest : public vclink::test::GitTest
+class LibGit2GuardTest : public vclink::test::GitFixture
 {
   protected:
     const int before_ = countLibGit2Starts();

@@ -6,7 +6,7 @@
 #include <gtest/gtest.h>
 #include <malloc.h>
 
-#include "RemoteTest.hpp"
+#include "main/remote/RemoteFixture.hpp"
 #include "support/libgit2Release.hpp"
 #include "vclink/git/BranchManager.hpp"
 #include "vclink/git/BranchParameters.hpp"
@@ -25,7 +25,7 @@ std::size_t heldBytes()
     return bytesOfTheSanitizer != nullptr ? bytesOfTheSanitizer() : ::mallinfo2().uordblks;
 }
 
-class Memory : public vclink::test::RemoteTest
+class Memory : public vclink::test::RemoteFixture
 {
   protected:
     /// What is left of each call, of ten after the first, in which buffers grow to their size.

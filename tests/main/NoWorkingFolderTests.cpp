@@ -8,7 +8,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "RemoteTest.hpp"
+#include "main/remote/RemoteFixture.hpp"
 #include "support/WorkingFolder.hpp"
 #include "support/text.hpp"
 #include "vclink/git/GitAdapterFactory.hpp"
@@ -27,7 +27,7 @@ using vclink::test::asUtf16;
 
 /// Commands of git need a working folder, so what an operation has done is looked at once there is
 /// one again.
-class DeletedWorkingFolder : public vclink::test::RemoteTest
+class DeletedWorkingFolder : public vclink::test::RemoteFixture
 {
   protected:
     upath pathOf(const std::string &name) const

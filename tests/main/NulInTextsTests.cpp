@@ -10,8 +10,8 @@
 #include <git2/errors.h>
 #include <gtest/gtest.h>
 
-#include "RemoteTest.hpp"
 #include "TestOptionsFactory.hpp"
+#include "main/remote/RemoteFixture.hpp"
 #include "support/text.hpp"
 #include "vclink/git/GitAdapterFactory.hpp"
 #include "vclink/git/GitAttribute.hpp"
@@ -71,7 +71,7 @@ std::string nulRefusalOf(const std::string &text)
 }
 
 /// "main" is checked out, "topic" has a commit more; "file" is changed, "new" is untracked.
-class NulInTexts : public vclink::test::RemoteTest
+class NulInTexts : public vclink::test::RemoteFixture
 {
   protected:
     NulInTexts()

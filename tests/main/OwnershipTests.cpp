@@ -5,7 +5,7 @@
 #include <git2.h>
 #include <gtest/gtest.h>
 
-#include "AdapterTest.hpp"
+#include "AdapterFixture.hpp"
 #include "support/UnprivilegedUser.hpp"
 #include "support/libgit2Release.hpp"
 #include "support/text.hpp"
@@ -21,7 +21,7 @@ namespace libgit2Release = vclink::test::libgit2Release;
 
 /// A repository of whoever runs the tests, met by the unprivileged user, who is another one where
 /// the tests run as root.
-class Ownership : public vclink::test::AdapterTest
+class Ownership : public vclink::test::AdapterFixture
 {
   protected:
     Ownership()

@@ -7,7 +7,7 @@
 #include <gtest/gtest.h>
 
 #include "support/Command.hpp"
-#include "support/GitTest.hpp"
+#include "support/GitFixture.hpp"
 
 namespace
 {
@@ -17,7 +17,7 @@ using vclink::test::Command;
 using vclink::test::CommandResult;
 
 /// A host whose objects are static, run in a working copy.
-class StaticHost : public vclink::test::GitTest
+class StaticHost : public vclink::test::GitFixture
 {
   protected:
     static constexpr const char *recordOfAnEnd = "Unregister merge driver: *";

@@ -15,7 +15,7 @@
 #include "options/CancellationPoller.hpp"
 #include "options/gitRecords.hpp"
 #include "support/Failure.hpp"
-#include "support/GitTest.hpp"
+#include "support/GitFixture.hpp"
 #include "support/LibGit2Session.hpp"
 #include "support/LogCapture.hpp"
 #include "support/TestInteractor.hpp"
@@ -68,7 +68,7 @@ class Members
     int calls = 0;
 };
 
-class CallbackJourney : public test::GitTest
+class CallbackJourney : public test::GitFixture
 {
   protected:
     CallbackJourney()

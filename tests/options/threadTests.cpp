@@ -12,7 +12,7 @@
 #include "options/Callbacks.hpp"
 #include "options/CancellationPoller.hpp"
 #include "options/gitRecords.hpp"
-#include "support/GitTest.hpp"
+#include "support/GitFixture.hpp"
 #include "support/LibGit2Session.hpp"
 #include "support/TestInteractor.hpp"
 #include "vclink/util/exception/CancelledOperationException.hpp"
@@ -62,7 +62,7 @@ int failingWalks(const std::string &path, int number)
     return matches;
 }
 
-class OptionThreads : public test::GitTest
+class OptionThreads : public test::GitFixture
 {
 };
 

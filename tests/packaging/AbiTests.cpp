@@ -9,7 +9,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "packaging/InstalledTest.hpp"
+#include "InstalledFixture.hpp"
 
 namespace
 {
@@ -29,7 +29,7 @@ TEST(Interface, IsThatOfTheBaseline)
 #endif
 
 /// A library of one class, and what the report says of it after a change.
-class AbiReport : public GitTest
+class AbiReport : public GitFixture
 {
   protected:
     AbiReport()

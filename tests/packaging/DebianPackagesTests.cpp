@@ -14,7 +14,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "packaging/InstalledTest.hpp"
+#include "InstalledFixture.hpp"
 
 namespace
 {
@@ -31,7 +31,7 @@ const std::string development = "libvclink-git-dev";
 const std::string hostDevelopment = "libvclink-host-dev";
 const std::string shell = "vclink-shell";
 
-class DebianPackages : public InstalledTest
+class DebianPackages : public InstalledFixture
 {
   protected:
     /// The packages' files by the packages' names.

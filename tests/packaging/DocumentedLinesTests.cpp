@@ -11,7 +11,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "packaging/InstalledTest.hpp"
+#include "InstalledFixture.hpp"
 
 namespace
 {
@@ -36,7 +36,7 @@ std::string blockOf(const std::string &language)
     return page.substr(begin, page.find("```", begin) - begin);
 }
 
-class DocumentedLines : public InstalledTest
+class DocumentedLines : public InstalledFixture
 {
   protected:
     /// examples/embed's main.cpp.

@@ -10,7 +10,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "packaging/InstalledTest.hpp"
+#include "InstalledFixture.hpp"
 
 namespace
 {
@@ -35,7 +35,7 @@ std::string commandOfSource()
     return source.substr(begin, source.find('\n', begin) - begin);
 }
 
-class Embed : public InstalledTest
+class Embed : public InstalledFixture
 {
   protected:
     /// Runs it on a working copy, and where there is none that can be shown.

@@ -11,7 +11,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "packaging/InstalledTest.hpp"
+#include "InstalledFixture.hpp"
 
 namespace
 {
@@ -52,7 +52,7 @@ std::vector<std::string> developmentFiles(const std::string &package)
             configuration + "Targets-" VCLINK_CONFIGURATION ".cmake"};
 }
 
-class Component : public InstalledTest
+class Component : public InstalledFixture
 {
   protected:
     std::vector<std::string> filesOf(const std::string &component) const

@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include <gmock/gmock.h>
 
-#include "ChangeTest.hpp"
+#include "ChangeFixture.hpp"
 
 namespace vclink::test
 {
@@ -13,7 +13,7 @@ using testing::HasSubstr;
 using testing::IsEmpty;
 using testing::Pair;
 
-class ShellAdd : public ChangeTest
+class ShellAdd : public ChangeFixture
 {
 };
 

@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include <gmock/gmock.h>
 
-#include "ShellMergeTest.hpp"
+#include "ShellMergeFixture.hpp"
 
 namespace vclink::test
 {
@@ -10,7 +10,7 @@ namespace
 
 using testing::HasSubstr;
 
-class ShellAttributes : public ShellMergeTest
+class ShellAttributes : public ShellMergeFixture
 {
   protected:
     ShellAttributes()

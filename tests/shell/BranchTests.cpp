@@ -3,7 +3,7 @@
 
 #include <gmock/gmock.h>
 
-#include "ShellMergeTest.hpp"
+#include "ShellMergeFixture.hpp"
 #include "runOnTerminal.hpp"
 
 namespace vclink::test
@@ -19,7 +19,7 @@ const std::vector<std::string> oddNames{"{}",     "++",         "a,b",       "qu
                                         "#hash",  "!call",      "group/one", "group/two",
                                         "a'b$(c", "ub\xC3\xBC", "\xFF\xFE",  "%s"};
 
-class ShellBranches : public ShellMergeTest
+class ShellBranches : public ShellMergeFixture
 {
   protected:
     std::vector<std::string> refs(const std::string &folder) const

@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include <gmock/gmock.h>
 
-#include "ChangeTest.hpp"
+#include "ChangeFixture.hpp"
 
 namespace vclink::test
 {
@@ -10,7 +10,7 @@ namespace
 
 using testing::StartsWith;
 
-class ShellChangeFailures : public ChangeTest
+class ShellChangeFailures : public ChangeFixture
 {
 };
 

@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include <gmock/gmock.h>
 
-#include "ChangeTest.hpp"
+#include "ChangeFixture.hpp"
 
 namespace vclink::test
 {
@@ -40,7 +40,7 @@ const std::vector<std::string> oddFileNames{"#notes#",
                                             "cut \xE2\x82",
                                             "folder#/!file"};
 
-class ShellChangeOfOddNames : public ChangeTest
+class ShellChangeOfOddNames : public ChangeFixture
 {
   protected:
     ShellChangeOfOddNames()
@@ -138,7 +138,7 @@ TEST_F(ShellChangeOfOddNames, MarksThemAsResolved)
 }
 
 /// Files that the library can't be told of, beside ones that their names could be mistaken for.
-class ShellChangeOfNamesWithBackslash : public ChangeTest
+class ShellChangeOfNamesWithBackslash : public ChangeFixture
 {
   protected:
     ShellChangeOfNamesWithBackslash()

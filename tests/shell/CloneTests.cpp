@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include <gmock/gmock.h>
 
-#include "ShellRemoteTest.hpp"
+#include "ShellRemoteFixture.hpp"
 #include "runOnTerminal.hpp"
 #include "support/libgit2Release.hpp"
 #include "transport/listening.hpp"
@@ -18,7 +18,7 @@ using testing::HasSubstr;
 using testing::Not;
 using testing::StartsWith;
 
-class ShellClone : public ShellRemoteTest
+class ShellClone : public ShellRemoteFixture
 {
   protected:
     /// Clones in the test's folder, and has to succeed without a word.

@@ -4,7 +4,7 @@
 #include <string>
 #include <vector>
 
-#include "ShellMergeTest.hpp"
+#include "ShellMergeFixture.hpp"
 
 namespace vclink::test
 {
@@ -12,7 +12,7 @@ namespace
 {
 
 /// Merges that write to a pipe whose reader has gone, as in "vclink-shell merge other | head".
-class ShellClosedPipes : public ShellMergeTest
+class ShellClosedPipes : public ShellMergeFixture
 {
   protected:
     ShellClosedPipes()

@@ -2,7 +2,7 @@
 #include <gmock/gmock.h>
 #include <unistd.h>
 
-#include "ChangeTest.hpp"
+#include "ChangeFixture.hpp"
 #include "runOnTerminal.hpp"
 
 namespace vclink::test
@@ -16,7 +16,7 @@ using testing::IsEmpty;
 using testing::Not;
 using testing::Pair;
 
-class ShellCommit : public ChangeTest
+class ShellCommit : public ChangeFixture
 {
   protected:
     void setIdentity() const

@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include <gmock/gmock.h>
 
-#include "ShellMergeTest.hpp"
+#include "ShellMergeFixture.hpp"
 #include "runOnTerminal.hpp"
 
 namespace vclink::test
@@ -13,7 +13,7 @@ using testing::HasSubstr;
 using testing::StartsWith;
 
 /// It needs no working copy.
-class ShellConfig : public ShellTest
+class ShellConfig : public ShellFixture
 {
   protected:
     CommandResult run(const std::vector<std::string> &arguments) const

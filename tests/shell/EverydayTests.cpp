@@ -10,7 +10,7 @@
 
 #include <gtest/gtest.h>
 
-#include "ShellTest.hpp"
+#include "ShellFixture.hpp"
 
 namespace vclink::test
 {
@@ -185,7 +185,7 @@ class Twin
     std::string program_;
 };
 
-class Everyday : public ShellTest, public testing::WithParamInterface<Scene>
+class Everyday : public ShellFixture, public testing::WithParamInterface<Scene>
 {
 };
 

@@ -4,7 +4,7 @@
 
 #include <gmock/gmock.h>
 
-#include "ShellTest.hpp"
+#include "ShellFixture.hpp"
 #include "support/UnprivilegedUser.hpp"
 
 namespace vclink::test
@@ -16,7 +16,7 @@ using testing::HasSubstr;
 using testing::Not;
 using testing::StartsWith;
 
-class ShellFailures : public ShellTest
+class ShellFailures : public ShellFixture
 {
 };
 

@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include <gmock/gmock.h>
 
-#include "ShellRemoteTest.hpp"
+#include "ShellRemoteFixture.hpp"
 
 namespace vclink::test
 {
@@ -11,7 +11,7 @@ namespace
 using testing::HasSubstr;
 using testing::StartsWith;
 
-class ShellFetch : public ShellRemoteTest
+class ShellFetch : public ShellRemoteFixture
 {
   protected:
     ShellFetch()

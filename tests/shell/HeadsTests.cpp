@@ -3,7 +3,7 @@
 
 #include <gmock/gmock.h>
 
-#include "ShellRemoteTest.hpp"
+#include "ShellRemoteFixture.hpp"
 
 namespace vclink::test
 {
@@ -13,7 +13,7 @@ namespace
 using testing::HasSubstr;
 using testing::IsEmpty;
 
-class ShellHeads : public ShellRemoteTest
+class ShellHeads : public ShellRemoteFixture
 {
   protected:
     /// What git says, written as the program does: git tells symbolic references first.

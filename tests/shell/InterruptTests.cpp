@@ -4,7 +4,7 @@
 #include <gmock/gmock.h>
 #include <sys/wait.h>
 
-#include "ShellTest.hpp"
+#include "ShellFixture.hpp"
 #include "TerminalProcess.hpp"
 
 namespace vclink::test
@@ -21,7 +21,7 @@ constexpr int fileCount = 1000;
 
 /// Real signals, sent when the program has written what tells how far it is. It can't get much
 /// further then, as the terminal takes no more before it is read.
-class ShellInterrupt : public ShellTest
+class ShellInterrupt : public ShellFixture
 {
   protected:
     ShellInterrupt()

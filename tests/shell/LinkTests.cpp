@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include <gmock/gmock.h>
 
-#include "ChangeTest.hpp"
+#include "ChangeFixture.hpp"
 #include "runOnTerminal.hpp"
 
 namespace vclink::test
@@ -19,7 +19,7 @@ namespace fs = std::filesystem;
 
 /// Symbolic links in the working copy, which the library follows: "link" leads to "a", "p/link" to
 /// "b", "astray" nowhere, all tracked, beside a "p/x".
-class ShellChangeOfLinks : public ChangeTest
+class ShellChangeOfLinks : public ChangeFixture
 {
   protected:
     ShellChangeOfLinks()

@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include <gmock/gmock.h>
 
-#include "ShellTest.hpp"
+#include "ShellFixture.hpp"
 
 namespace vclink::test
 {
@@ -12,7 +12,7 @@ using testing::ContainsRegex;
 using testing::HasSubstr;
 using testing::Not;
 
-class ShellLog : public ShellTest
+class ShellLog : public ShellFixture
 {
   protected:
     /// What stands on standard error after a failure with these severities shown.

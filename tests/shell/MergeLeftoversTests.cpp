@@ -4,7 +4,7 @@
 
 #include <gmock/gmock.h>
 
-#include "ShellMergeTest.hpp"
+#include "ShellMergeFixture.hpp"
 
 namespace vclink::test
 {
@@ -24,7 +24,7 @@ const std::string asideBegin = "\nvclink-shell: These files have another name no
                                "something else has theirs:\n";
 
 /// What a merge with conflicts leaves, beside the files in conflict.
-class ShellMergeLeftovers : public ShellMergeTest
+class ShellMergeLeftovers : public ShellMergeFixture
 {
   protected:
     /// Three files of which each side changes its own end, given to drivers by these attributes.
@@ -135,7 +135,7 @@ TEST_F(ShellMergeLeftovers, NameGitmodulesInConflict)
 }
 
 /// The merge is killed by a command that it runs.
-class ShellInterruptedMerge : public ShellMergeTest
+class ShellInterruptedMerge : public ShellMergeFixture
 {
   protected:
     ShellInterruptedMerge()

@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include <gmock/gmock.h>
 
-#include "ShellMergeTest.hpp"
+#include "ShellMergeFixture.hpp"
 
 namespace vclink::test
 {
@@ -15,7 +15,7 @@ using testing::StartsWith;
 
 /// The back end refuses a merge that would lose work. The program shows its words, and asks for no
 /// states itself.
-class ShellMergeOverChanges : public ShellMergeTest
+class ShellMergeOverChanges : public ShellMergeFixture
 {
   protected:
     /// Expects that the merge is refused with this text, and leaves the files and the branch.

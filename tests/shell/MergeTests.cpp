@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include <gmock/gmock.h>
 
-#include "ShellMergeTest.hpp"
+#include "ShellMergeFixture.hpp"
 
 namespace vclink::test
 {
@@ -17,7 +17,7 @@ const std::string wayOn =
     "\nEdit each until it is right, and mark it with \"vclink-shell resolved\". Then conclude the "
     "merge\nwith \"vclink-shell commit\", or undo it with \"git merge --abort\".\n";
 
-class ShellMerge : public ShellMergeTest
+class ShellMerge : public ShellMergeFixture
 {
   protected:
     /// Merges "other" with the program, and with git in a twin, which has to give the same.

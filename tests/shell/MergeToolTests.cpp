@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include <gmock/gmock.h>
 
-#include "ShellMergeTest.hpp"
+#include "ShellMergeFixture.hpp"
 
 namespace vclink::test
 {
@@ -18,7 +18,7 @@ const std::string theirs = "1\n2\n3\n4\n5\n6\n7\n8\ntheirs\n";
 const std::string both = "ours\n2\n3\n4\n5\n6\n7\n8\ntheirs\n";
 
 /// The merge tool that comes along, installed by the program.
-class ShellMergeTool : public ShellMergeTest
+class ShellMergeTool : public ShellMergeFixture
 {
   protected:
     ShellMergeTool()

@@ -3,7 +3,7 @@
 
 #include <gmock/gmock.h>
 
-#include "ShellTest.hpp"
+#include "ShellFixture.hpp"
 
 namespace vclink::test
 {
@@ -13,7 +13,7 @@ namespace
 using testing::ElementsAre;
 
 /// How names of every kind get in and out.
-class ShellNames : public ShellTest
+class ShellNames : public ShellFixture
 {
 };
 

@@ -2,14 +2,14 @@
 #include <csignal>
 #include <filesystem>
 
-#include "ShellTest.hpp"
+#include "ShellFixture.hpp"
 
 namespace vclink::test
 {
 namespace
 {
 
-class ShellOutput : public ShellTest
+class ShellOutput : public ShellFixture
 {
   protected:
     /// Runs a shell script in a repository with many files, "$0" being the program.

@@ -1,14 +1,14 @@
 // SPDX-License-Identifier: MIT
 #include <gmock/gmock.h>
 
-#include "ShellTest.hpp"
+#include "ShellFixture.hpp"
 
 namespace vclink::test
 {
 namespace
 {
 
-class ShellProbe : public ShellTest
+class ShellProbe : public ShellFixture
 {
   protected:
     void expectAnswer(const std::string &name, const std::string &answer, int status) const

@@ -3,7 +3,7 @@
 
 #include <gmock/gmock.h>
 
-#include "ChangeTest.hpp"
+#include "ChangeFixture.hpp"
 #include "runOnTerminal.hpp"
 
 namespace vclink::test
@@ -27,7 +27,7 @@ std::size_t count(const std::string &text, const std::string &part)
     return times;
 }
 
-class ShellProgress : public ChangeTest
+class ShellProgress : public ChangeFixture
 {
   protected:
     ShellProgress()

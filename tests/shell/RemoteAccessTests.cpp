@@ -3,7 +3,7 @@
 
 #include <gmock/gmock.h>
 
-#include "ShellTest.hpp"
+#include "ShellFixture.hpp"
 #include "transport/SshAgent.hpp"
 #include "transport/SshServer.hpp"
 #include "transport/WebServer.hpp"
@@ -21,7 +21,7 @@ using testing::StartsWith;
 const std::string leakOptions = "print_suppressions=0:suppressions=" VCLINK_SSH_LEAK_SUPPRESSIONS;
 
 /// The servers run before a test's environment is made, since they outlive it.
-template <class Server> class AccessTest : public ShellTest
+template <class Server> class AccessTest : public ShellFixture
 {
   protected:
     static void TearDownTestSuite()

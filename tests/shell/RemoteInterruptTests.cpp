@@ -8,7 +8,7 @@
 #include <gmock/gmock.h>
 #include <sys/wait.h>
 
-#include "ShellRemoteTest.hpp"
+#include "ShellRemoteFixture.hpp"
 #include "TerminalProcess.hpp"
 #include "transport/ScriptedServer.hpp"
 #include "transport/relay.hpp"
@@ -23,7 +23,7 @@ using testing::HasSubstr;
 using testing::Not;
 
 /// Real signals, sent when it is known how far the program is.
-class ShellRemoteInterrupt : public ShellRemoteTest
+class ShellRemoteInterrupt : public ShellRemoteFixture
 {
   protected:
     TerminalProcess start(const std::vector<std::string> &arguments) const

@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include <gmock/gmock.h>
 
-#include "ChangeTest.hpp"
+#include "ChangeFixture.hpp"
 
 namespace vclink::test
 {
@@ -12,7 +12,7 @@ using testing::ElementsAre;
 using testing::IsEmpty;
 using testing::Pair;
 
-class ShellRemove : public ChangeTest
+class ShellRemove : public ChangeFixture
 {
 };
 

@@ -1,14 +1,14 @@
 // SPDX-License-Identifier: MIT
 #include <gmock/gmock.h>
 
-#include "ChangeTest.hpp"
+#include "ChangeFixture.hpp"
 
 namespace vclink::test
 {
 namespace
 {
 
-class ShellResolved : public ChangeTest
+class ShellResolved : public ChangeFixture
 {
 };
 

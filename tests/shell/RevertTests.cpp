@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include <gmock/gmock.h>
 
-#include "ChangeTest.hpp"
+#include "ChangeFixture.hpp"
 
 namespace vclink::test
 {
@@ -13,7 +13,7 @@ using testing::IsEmpty;
 using testing::Pair;
 using testing::StartsWith;
 
-class ShellRevert : public ChangeTest
+class ShellRevert : public ChangeFixture
 {
   protected:
     /// A change of every kind.

@@ -19,7 +19,7 @@
 #include <sys/wait.h>
 #include <unistd.h>
 
-#include "ShellTest.hpp"
+#include "ShellFixture.hpp"
 #include "differential/Random.hpp"
 
 namespace vclink::test
@@ -101,7 +101,7 @@ class Program
 
 /// Signals at moments that are chosen at random, between the start of the program and its end.
 /// VCLINK_SIGNALS says how many of each kind an operation gets, VCLINK_SEED when.
-class ShellSignals : public ShellTest
+class ShellSignals : public ShellFixture
 {
   protected:
     ShellSignals()

@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include <gmock/gmock.h>
 
-#include "ShellMergeTest.hpp"
+#include "ShellMergeFixture.hpp"
 
 namespace vclink::test
 {
@@ -11,7 +11,7 @@ namespace
 using testing::HasSubstr;
 using testing::StartsWith;
 
-class ShellState : public ShellMergeTest
+class ShellState : public ShellMergeFixture
 {
 };
 

@@ -7,7 +7,7 @@
 
 #include <gmock/gmock.h>
 
-#include "ShellMergeTest.hpp"
+#include "ShellMergeFixture.hpp"
 
 namespace vclink::test
 {
@@ -19,7 +19,7 @@ using testing::HasSubstr;
 using testing::StartsWith;
 
 /// What the documents say of libgit2's differences and of commands in merges.
-class ShellStatements : public ShellMergeTest
+class ShellStatements : public ShellMergeFixture
 {
   protected:
     /// A driver for all files, which writes its words, one a line.

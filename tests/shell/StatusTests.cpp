@@ -5,7 +5,7 @@
 
 #include <gmock/gmock.h>
 
-#include "ShellTest.hpp"
+#include "ShellFixture.hpp"
 
 namespace vclink::test
 {
@@ -16,7 +16,7 @@ using testing::ElementsAre;
 using testing::IsEmpty;
 using testing::UnorderedElementsAre;
 
-class ShellStatus : public ShellTest
+class ShellStatus : public ShellFixture
 {
 };
 

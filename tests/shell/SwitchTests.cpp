@@ -2,7 +2,7 @@
 #include <gmock/gmock.h>
 #include <sys/wait.h>
 
-#include "ShellMergeTest.hpp"
+#include "ShellMergeFixture.hpp"
 #include "TerminalProcess.hpp"
 #include "runOnTerminal.hpp"
 
@@ -15,7 +15,7 @@ using testing::EndsWith;
 using testing::HasSubstr;
 using testing::StartsWith;
 
-class ShellSwitch : public ShellMergeTest
+class ShellSwitch : public ShellMergeFixture
 {
   protected:
     ShellSwitch()
@@ -105,7 +105,7 @@ TEST_F(ShellSwitch, TellsAPersonWhichBranchIsTheCurrentOne)
 }
 
 /// A branch that changes many files, so that there is time for Ctrl-C.
-class ShellInterruptOfBranches : public ShellMergeTest
+class ShellInterruptOfBranches : public ShellMergeFixture
 {
   protected:
     static constexpr int fileCount = 1000;

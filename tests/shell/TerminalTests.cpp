@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include <gmock/gmock.h>
 
-#include "ShellTest.hpp"
+#include "ShellFixture.hpp"
 #include "runOnTerminal.hpp"
 
 namespace vclink::test
@@ -16,7 +16,7 @@ const std::string plainLines = "modified\tedited\nunversioned\tnew\n";
 const std::string colouredLines = "\33[33mmodified\33[m\tedited\n\33[36munversioned\33[m\tnew\n";
 const std::string counts = "3 files: 1 clean, 1 modified, 1 unversioned\n";
 
-class ShellOnTerminal : public ShellTest
+class ShellOnTerminal : public ShellFixture
 {
   protected:
     ShellOnTerminal()

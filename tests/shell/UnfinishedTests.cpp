@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include <gmock/gmock.h>
 
-#include "ShellMergeTest.hpp"
+#include "ShellMergeFixture.hpp"
 
 namespace vclink::test
 {
@@ -13,7 +13,7 @@ using testing::StartsWith;
 
 /// Commits in the midst of what git does step by step. "other" has three commits, of which the
 /// first clashes with the current branch in "a".
-class ShellUnfinished : public ShellMergeTest
+class ShellUnfinished : public ShellMergeFixture
 {
   protected:
     ShellUnfinished()

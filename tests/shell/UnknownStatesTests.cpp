@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include <gmock/gmock.h>
 
-#include "ShellMergeTest.hpp"
+#include "ShellMergeFixture.hpp"
 
 namespace vclink::test
 {
@@ -12,7 +12,7 @@ using testing::StartsWith;
 
 /// libgit2 can't read the working copy. The back end answers with no states then, which looks like
 /// a working copy in which nothing has changed.
-class ShellUnknownStates : public ShellMergeTest
+class ShellUnknownStates : public ShellMergeFixture
 {
   protected:
     static std::string reason()
@@ -120,7 +120,7 @@ TEST_F(ShellUnknownStates, AreNotThoseOfAnEmptyRepositoryOrABareOne)
 }
 
 /// A folder in a clone that is laid out as a repository.
-class ShellBareFolder : public ShellMergeTest
+class ShellBareFolder : public ShellMergeFixture
 {
   protected:
     ShellBareFolder()

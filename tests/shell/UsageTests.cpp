@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include <gmock/gmock.h>
 
-#include "ShellTest.hpp"
+#include "ShellFixture.hpp"
 
 namespace vclink::test
 {
@@ -11,7 +11,7 @@ namespace
 using testing::HasSubstr;
 using testing::StartsWith;
 
-class ShellUsage : public ShellTest
+class ShellUsage : public ShellFixture
 {
 };
 

@@ -1,14 +1,14 @@
 // SPDX-License-Identifier: MIT
 #include <gmock/gmock.h>
 
-#include "ShellTest.hpp"
+#include "ShellFixture.hpp"
 
 namespace vclink::test
 {
 namespace
 {
 
-class ShellVersion : public ShellTest
+class ShellVersion : public ShellFixture
 {
 };
 

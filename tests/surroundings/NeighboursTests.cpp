@@ -8,8 +8,8 @@
 #include <git2/checkout.h>
 #include <gtest/gtest.h>
 
-#include "main/MergeTest.hpp"
 #include "main/TestOptionsFactory.hpp"
+#include "main/merge/MergeFixture.hpp"
 #include "support/text.hpp"
 
 namespace
@@ -23,7 +23,7 @@ using vclink::test::stampOf;
 using vclink::test::workingTreeOf;
 
 /// What is beside the files that an operation writes: "topic" adds "folder/new" and changes "file".
-class Neighbours : public vclink::test::MergeTest
+class Neighbours : public vclink::test::MergeFixture
 {
   protected:
     Neighbours()

@@ -12,7 +12,7 @@
 
 #include "Situation.hpp"
 #include "differential/Snapshot.hpp"
-#include "support/GitTest.hpp"
+#include "support/GitFixture.hpp"
 #include "support/LibGit2Session.hpp"
 #include "surroundingDifferences.hpp"
 #include "vclink/CMAdapter.hpp"
@@ -22,7 +22,7 @@ namespace vclink::test
 
 /// Every obstacle in every place, for one operation: the library in one working copy, git in its
 /// twin. VCLINK_CELL names a part of the situations to look at alone, as they are printed.
-class Surroundings : public GitTest
+class Surroundings : public GitFixture
 {
   protected:
     /// @param make makes what the twins are copies of

@@ -18,7 +18,7 @@
 #include "Peer.hpp"
 #include "differential/Random.hpp"
 #include "differential/Snapshot.hpp"
-#include "support/GitTest.hpp"
+#include "support/GitFixture.hpp"
 #include "support/LibGit2Session.hpp"
 #include "support/TestInteractor.hpp"
 #include "support/text.hpp"
@@ -147,7 +147,7 @@ std::ostream &operator<<(std::ostream &stream, const Operation &operation)
 
 /// Each of the library's operations beside each of the peer's trades, on a working copy of its own
 /// each time. VCLINK_ROUNDS says how many times, VCLINK_SEED when the library begins.
-class TwoProcesses : public vclink::test::GitTest, public testing::WithParamInterface<Operation>
+class TwoProcesses : public vclink::test::GitFixture, public testing::WithParamInterface<Operation>
 {
   protected:
     TwoProcesses()

@@ -4,7 +4,7 @@
 
 #include <gtest/gtest.h>
 
-#include "TransportTest.hpp"
+#include "TransportFixture.hpp"
 
 namespace
 {
@@ -16,7 +16,7 @@ using vclink::test::failureOf;
 using vclink::test::GitRepository;
 using vclink::test::referencesOf;
 
-class Clone : public vclink::test::TransportTest
+class Clone : public vclink::test::TransportFixture
 {
   protected:
     /// Branches, tags of both kinds, and files of every kind that a tree holds.

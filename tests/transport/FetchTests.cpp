@@ -3,7 +3,7 @@
 
 #include <gtest/gtest.h>
 
-#include "TransportTest.hpp"
+#include "TransportFixture.hpp"
 
 namespace
 {
@@ -14,7 +14,7 @@ using vclink::test::referencesOf;
 
 /// Two clones of one repository: what the library fetches into the one is what git fetches into the
 /// other.
-class Fetch : public vclink::test::TransportTest
+class Fetch : public vclink::test::TransportFixture
 {
   protected:
     Fetch()

@@ -5,7 +5,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "TransportTest.hpp"
+#include "TransportFixture.hpp"
 
 namespace
 {
@@ -15,7 +15,7 @@ using testing::SizeIs;
 using vclink::test::allTransports;
 using vclink::test::GitRepository;
 
-class RemoteHeads : public vclink::test::TransportTest
+class RemoteHeads : public vclink::test::TransportFixture
 {
   protected:
     RemoteHeads()

@@ -11,7 +11,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "DaemonTest.hpp"
+#include "DaemonFixture.hpp"
 #include "ScriptedServer.hpp"
 #include "error/logging/severity.hpp"
 #include "relay.hpp"
@@ -45,7 +45,7 @@ void expectToldBy(const Failure &failure)
 }
 
 /// Servers that can't be talked to at all, each behind every kind of address.
-class UselessServer : public vclink::test::RemoteTest,
+class UselessServer : public vclink::test::RemoteFixture,
                       public testing::WithParamInterface<const char *>
 {
   protected:
@@ -107,7 +107,7 @@ INSTANTIATE_TEST_SUITE_P(Behind, UselessServer,
                          });
 
 /// Servers that begin well.
-class MisbehavingServer : public vclink::test::DaemonTest
+class MisbehavingServer : public vclink::test::DaemonFixture
 {
   protected:
     /// Passes everything on until so much went to the client, then ends.

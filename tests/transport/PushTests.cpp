@@ -7,7 +7,7 @@
 
 #include <git2/errors.h>
 
-#include "TransportTest.hpp"
+#include "TransportFixture.hpp"
 #include "error/logging/severity.hpp"
 #include "support/LogCapture.hpp"
 
@@ -25,7 +25,7 @@ using vclink::test::Transport;
 using vclink::test::transportsWithServer;
 
 /// A clone, in which a commit was made.
-class Push : public vclink::test::TransportTest
+class Push : public vclink::test::TransportFixture
 {
   protected:
     Push()

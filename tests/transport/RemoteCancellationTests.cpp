@@ -8,7 +8,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "DaemonTest.hpp"
+#include "DaemonFixture.hpp"
 #include "ScriptedServer.hpp"
 #include "error/logging/severity.hpp"
 #include "relay.hpp"
@@ -37,7 +37,7 @@ bool begins(const LogRecord &record, const std::string &text)
     return record.message.compare(0, text.size(), text) == 0;
 }
 
-class RemoteCancellation : public vclink::test::DaemonTest
+class RemoteCancellation : public vclink::test::DaemonFixture
 {
   protected:
     /// A script that passes the server's answers on, a little at a time. When a tenth has gone

@@ -12,7 +12,7 @@ using vclink::test::allTransports;
 using vclink::test::GitRepository;
 
 /// What git itself makes of the servers: a failure here is not the library's.
-class Servers : public vclink::test::RunningServer, public vclink::test::GitTest
+class Servers : public vclink::test::RunningServer, public vclink::test::GitFixture
 {
   protected:
     Servers()

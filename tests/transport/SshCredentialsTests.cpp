@@ -11,7 +11,7 @@
 
 #include <git2/errors.h>
 
-#include "RemoteTest.hpp"
+#include "RemoteFixture.hpp"
 #include "SshAgent.hpp"
 #include "SshServer.hpp"
 #include "error/logging/severity.hpp"
@@ -49,7 +49,7 @@ class RunningSshServer
 std::unique_ptr<SshServer> RunningSshServer::running;
 
 /// A repository with one commit, on a server that lets one key in.
-class SshCredentials : public RunningSshServer, public vclink::test::RemoteTest
+class SshCredentials : public RunningSshServer, public vclink::test::RemoteFixture
 {
   protected:
     SshCredentials()
@@ -179,7 +179,7 @@ TEST_F(SshCredentials, HaveNoUserWhereTheAddressHasNone)
 }
 
 /// A server that takes passwords only.
-class SshPasswords : public vclink::test::RemoteTest
+class SshPasswords : public vclink::test::RemoteFixture
 {
   protected:
     SshServer server_{SshServer::Offers::Passwords};

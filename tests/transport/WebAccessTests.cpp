@@ -10,7 +10,7 @@
 
 #include <git2.h>
 
-#include "RemoteTest.hpp"
+#include "RemoteFixture.hpp"
 #include "WebServer.hpp"
 #include "error/logging/severity.hpp"
 #include "support/LogCapture.hpp"
@@ -40,7 +40,7 @@ class RunningWebServer
 };
 std::unique_ptr<WebServer> RunningWebServer::running;
 
-class WebTest : public RunningWebServer, public vclink::test::RemoteTest
+class WebTest : public RunningWebServer, public vclink::test::RemoteFixture
 {
   protected:
     WebTest()

@@ -7,7 +7,7 @@
 #include <gtest/gtest.h>
 
 #include "GitServer.hpp"
-#include "support/GitTest.hpp"
+#include "support/GitFixture.hpp"
 
 namespace vclink::test
 {

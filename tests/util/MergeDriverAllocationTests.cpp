@@ -10,7 +10,7 @@
 #include <git2/sys/merge.h>
 #include <gtest/gtest.h>
 
-#include "MergeDriverTest.hpp"
+#include "MergeDriverFixture.hpp"
 #include "error/errorUtil/callbackException.hpp"
 #include "support/FailingAllocations.hpp"
 #include "vclink/git/LibGit2Guard.hpp"
@@ -18,7 +18,7 @@
 namespace
 {
 
-class MergeDriverAllocation : public vclink::test::MergeDriverTest
+class MergeDriverAllocation : public vclink::test::MergeDriverFixture
 {
   protected:
     /// Merges while one allocation fails.

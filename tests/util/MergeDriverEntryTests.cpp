@@ -19,7 +19,7 @@
 #include "error/errorUtil/GitResult.hpp"
 #include "error/errorUtil/callbackException.hpp"
 #include "support/Failure.hpp"
-#include "support/GitTest.hpp"
+#include "support/GitFixture.hpp"
 #include "support/LibGit2Session.hpp"
 #include "support/LogCapture.hpp"
 #include "support/NothingLeft.hpp"
@@ -63,7 +63,7 @@ struct Answer
     std::exception_ptr exception;
 };
 
-class MergeDriverEntry : public vclink::test::GitTest
+class MergeDriverEntry : public vclink::test::GitFixture
 {
   protected:
     MergeDriverEntry()

@@ -12,12 +12,12 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "MergeDriverTest.hpp"
+#include "MergeDriverFixture.hpp"
 #include "error/errorUtil/callbackException.hpp"
 #include "support/Failure.hpp"
 #include "support/SignalAction.hpp"
 #include "support/text.hpp"
-#include "util/processError.hpp"
+#include "util/command/processError.hpp"
 
 namespace
 {
@@ -28,7 +28,7 @@ using vclink::test::LogCapture;
 using vclink::test::LogRecord;
 using vclink::test::SignalAction;
 
-class MergeDriverFailure : public vclink::test::MergeDriverTest
+class MergeDriverFailure : public vclink::test::MergeDriverFixture
 {
   protected:
     /// The error with which a merge fails whose command can't be started.

@@ -9,7 +9,7 @@
 
 #include <gtest/gtest.h>
 
-#include "MergeDriverTest.hpp"
+#include "MergeDriverFixture.hpp"
 #include "support/SignalAction.hpp"
 #include "support/ThousandDescriptors.hpp"
 #include "support/UnprivilegedUser.hpp"
@@ -24,7 +24,7 @@ using vclink::test::Scripts;
 using vclink::test::SignalAction;
 using vclink::test::ThousandDescriptors;
 
-class MergeDriverHost : public vclink::test::MergeDriverTest
+class MergeDriverHost : public vclink::test::MergeDriverFixture
 {
   protected:
     MergeDriverHost()
@@ -138,7 +138,7 @@ TEST_F(MergeDriverHost, RunsTheCommandWithoutFilesWhenTheTemporaryFolderIsNotWri
     EXPECT_EQ(vclink::test::runAsUnprivilegedUser([this] { return repository_.read("file"); }), "");
 }
 
-class MergeDriverConfig : public vclink::test::MergeDriverTest
+class MergeDriverConfig : public vclink::test::MergeDriverFixture
 {
   protected:
     MergeDriverConfig()

@@ -7,7 +7,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "MergeDriverTest.hpp"
+#include "MergeDriverFixture.hpp"
 
 namespace
 {
@@ -24,7 +24,7 @@ const std::string signature =
     "int {anonymous}::wildcardGitDriverApplyCallback(git_merge_driver*, const char**, uint32_t*, "
     "git_buf*, const char*, const git_merge_driver_source*)";
 
-class MergeDriverRecords : public vclink::test::MergeDriverTest
+class MergeDriverRecords : public vclink::test::MergeDriverFixture
 {
   protected:
     /// Records as "severity message".

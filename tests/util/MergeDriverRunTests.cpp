@@ -11,7 +11,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "MergeDriverTest.hpp"
+#include "MergeDriverFixture.hpp"
 
 namespace
 {
@@ -20,7 +20,7 @@ using testing::ElementsAre;
 using testing::HasSubstr;
 using vclink::test::Scripts;
 
-class MergeDriverRun : public vclink::test::MergeDriverTest
+class MergeDriverRun : public vclink::test::MergeDriverFixture
 {
   protected:
     /// The words that the command of the conflict in "file" was given.
@@ -306,7 +306,7 @@ std::ostream &operator<<(std::ostream &stream, const SidesCase &sides)
     return stream << sides.ours.name << " and " << sides.theirs.name;
 }
 
-class MergeDriverPath : public vclink::test::MergeDriverTest,
+class MergeDriverPath : public vclink::test::MergeDriverFixture,
                         public testing::WithParamInterface<SidesCase>
 {
   protected:

@@ -7,7 +7,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "support/GitTest.hpp"
+#include "support/GitFixture.hpp"
 #include "support/LibGit2Session.hpp"
 #include "support/LogCapture.hpp"
 #include "util/GitMergeDriverLookup.hpp"
@@ -20,7 +20,7 @@ using testing::ElementsAre;
 using testing::IsEmpty;
 using vclink::test::LogCapture;
 
-class RegisterMergeDrivers : public vclink::test::GitTest
+class RegisterMergeDrivers : public vclink::test::GitFixture
 {
   protected:
     vclink::test::LibGit2Session session_{environment()};

@@ -11,7 +11,7 @@
 #include <sys/stat.h>
 
 #include "fl/filesystem/operations.hpp"
-#include "support/GitTest.hpp"
+#include "support/GitFixture.hpp"
 #include "support/Scripts.hpp"
 #include "support/interposition.hpp"
 #include "support/text.hpp"
@@ -74,7 +74,7 @@ using testing::IsEmpty;
 using vclink::test::asBytes;
 using vclink::test::Scripts;
 
-class TemporaryFileHost : public vclink::test::GitTest
+class TemporaryFileHost : public vclink::test::GitFixture
 {
   protected:
     TemporaryFileHost()

@@ -13,7 +13,7 @@
 
 #include "error/errorUtil/GitResult.hpp"
 #include "support/Failure.hpp"
-#include "support/GitTest.hpp"
+#include "support/GitFixture.hpp"
 #include "support/LibGit2Session.hpp"
 #include "support/LogCapture.hpp"
 #include "support/NothingLeft.hpp"
@@ -35,7 +35,7 @@ using vclink::test::LogCapture;
 using vclink::test::LogRecord;
 using vclink::test::Scripts;
 
-class TemporaryFile : public vclink::test::GitTest
+class TemporaryFile : public vclink::test::GitFixture
 {
   protected:
     static std::string write(const std::string &bytes)

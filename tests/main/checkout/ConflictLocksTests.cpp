@@ -7,7 +7,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "ObstacleTest.hpp"
+#include "ObstacleFixture.hpp"
 
 namespace
 {
@@ -15,7 +15,7 @@ namespace
 using testing::IsEmpty;
 
 /// A conflict in "file", and something with the name "file.lock".
-class ConflictLocks : public vclink::test::ObstacleTest
+class ConflictLocks : public vclink::test::ObstacleFixture
 {
   protected:
     void makeConflict(const std::function<void()> &also = [] {})

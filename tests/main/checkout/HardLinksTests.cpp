@@ -9,7 +9,7 @@
 #include <gtest/gtest.h>
 #include <sys/stat.h>
 
-#include "ObstacleTest.hpp"
+#include "ObstacleFixture.hpp"
 #include "support/UnprivilegedUser.hpp"
 #include "support/text.hpp"
 
@@ -24,7 +24,7 @@ using vclink::test::runAsUnprivilegedUser;
 
 /// Files of the working copy that have a further name, for example in a copy of it that was made of
 /// hard links.
-class HardLinks : public vclink::test::ObstacleTest
+class HardLinks : public vclink::test::ObstacleFixture
 {
   protected:
     HardLinks()

@@ -3,7 +3,7 @@
 
 #include <gtest/gtest.h>
 
-#include "ObstacleTest.hpp"
+#include "ObstacleFixture.hpp"
 #include "support/text.hpp"
 
 namespace
@@ -12,7 +12,7 @@ namespace
 /// Two histories with two merge bases, which both add "d/p" and "d/q". Ours has deleted them since;
 /// theirs has "d/p" as one base and "d/q" as the other, so that no base alone shows both as
 /// changed.
-class MergeBases : public vclink::test::ObstacleTest
+class MergeBases : public vclink::test::ObstacleFixture
 {
   protected:
     MergeBases()

@@ -5,12 +5,12 @@
 #include <git2.h>
 #include <gtest/gtest.h>
 
-#include "../DrivenMergeTest.hpp"
+#include "main/merge/DrivenMergeFixture.hpp"
 
 namespace
 {
 
-class MergeCommandObstacles : public vclink::test::DrivenMergeTest
+class MergeCommandObstacles : public vclink::test::DrivenMergeFixture
 {
   protected:
     /// Has the command do this in the working copy, and then join the sides.

@@ -9,7 +9,7 @@
 #include <sys/stat.h>
 
 #include "../TestOptionsFactory.hpp"
-#include "ObstacleTest.hpp"
+#include "ObstacleFixture.hpp"
 #include "support/text.hpp"
 #include "vclink/util/exception/CancelledOperationException.hpp"
 
@@ -27,7 +27,7 @@ using vclink::test::textOf;
 using vclink::util::exception::CancelledOperationException;
 
 /// A true merge beside what the user has not committed.
-class MergeObstacles : public vclink::test::ObstacleTest
+class MergeObstacles : public vclink::test::ObstacleFixture
 {
   protected:
     /// Diverges; theirs is "topic".

@@ -8,7 +8,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "ObstacleTest.hpp"
+#include "ObstacleFixture.hpp"
 
 namespace
 {
@@ -17,7 +17,7 @@ namespace fs = std::filesystem;
 using testing::IsEmpty;
 using vclink::test::makeFifo;
 
-class PassedObstacles : public vclink::test::ObstacleTest
+class PassedObstacles : public vclink::test::ObstacleFixture
 {
   protected:
     /// Diverges; theirs is "topic". "n-b" sorts between "n" and "n/".

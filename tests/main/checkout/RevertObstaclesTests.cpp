@@ -8,9 +8,9 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "../StagingTest.hpp"
-#include "ObstacleTest.hpp"
+#include "ObstacleFixture.hpp"
 #include "error/errorUtil/GitResult.hpp"
+#include "main/files/StagingFixture.hpp"
 #include "support/text.hpp"
 #include "util/repository/repository.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
@@ -45,7 +45,7 @@ int hear(git_checkout_notify_t /*why*/, const char *path, const git_diff_file * 
 }
 
 /// A folder and a file of the repository have become links to what lies outside.
-class RevertObstacles : public vclink::test::StagingTest
+class RevertObstacles : public vclink::test::StagingFixture
 {
   protected:
     RevertObstacles()

@@ -6,9 +6,9 @@
 
 #include <gtest/gtest.h>
 
-#include "ObstacleTest.hpp"
+#include "ObstacleFixture.hpp"
 #include "main/checkout/ClearedWay.hpp"
-#include "support/GitTest.hpp"
+#include "support/GitFixture.hpp"
 #include "support/UnprivilegedUser.hpp"
 #include "support/text.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
@@ -24,7 +24,7 @@ using vclink::test::makeFifo;
 using vclink::test::makeSocket;
 using vclink::test::runAsUnprivilegedUser;
 
-class StandingOfPaths : public vclink::test::GitTest
+class StandingOfPaths : public vclink::test::GitFixture
 {
   protected:
     fs::path operator/(const std::string &name) const

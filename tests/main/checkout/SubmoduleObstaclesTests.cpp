@@ -7,7 +7,7 @@
 #include <gtest/gtest.h>
 
 #include "../TestOptionsFactory.hpp"
-#include "ObstacleTest.hpp"
+#include "ObstacleFixture.hpp"
 #include "support/text.hpp"
 
 namespace
@@ -21,7 +21,7 @@ using vclink::test::GitRepository;
 using vclink::test::makeFifo;
 
 /// Switches, fast-forwards and merges between branches with and without the submodule "module".
-class SubmoduleObstacles : public vclink::test::ObstacleTest
+class SubmoduleObstacles : public vclink::test::ObstacleFixture
 {
   protected:
     /// "with" has the submodule, main does not, and its folder is left.

@@ -9,7 +9,7 @@
 #include <gtest/gtest.h>
 
 #include "../TestOptionsFactory.hpp"
-#include "ObstacleTest.hpp"
+#include "ObstacleFixture.hpp"
 #include "support/text.hpp"
 #include "vclink/util/exception/CancelledOperationException.hpp"
 
@@ -28,7 +28,7 @@ using vclink::test::makeSocket;
 using vclink::util::exception::CancelledOperationException;
 
 /// A switch and a fast-forward beside what the user has not committed.
-class SwitchObstacles : public vclink::test::ObstacleTest
+class SwitchObstacles : public vclink::test::ObstacleFixture
 {
   protected:
     /// "topic" is one commit ahead. What goes before it in path order changes as well, so that a

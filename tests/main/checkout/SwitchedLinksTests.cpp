@@ -7,7 +7,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "../SwitchBranchTest.hpp"
+#include "main/branches/SwitchBranchFixture.hpp"
 #include "support/text.hpp"
 #include "vclink/util/exception/CancelledOperationException.hpp"
 
@@ -25,7 +25,7 @@ using vclink::util::exception::CancelledOperationException;
 
 /// "main" with the folder "dir", of which the test makes a link to a folder outside that holds the
 /// same names, and branches that change it.
-class SwitchedLinks : public vclink::test::SwitchBranchTest
+class SwitchedLinks : public vclink::test::SwitchBranchFixture
 {
   protected:
     SwitchedLinks()

@@ -9,7 +9,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "../BranchTest.hpp"
+#include "main/branches/BranchFixture.hpp"
 #include "support/text.hpp"
 #include "util/repository/repository.hpp"
 
@@ -22,7 +22,7 @@ using testing::IsEmpty;
 using vclink::test::splitLines;
 
 /// What two trees differ in, compared with `git diff-tree`.
-class TreeChanges : public vclink::test::BranchTest
+class TreeChanges : public vclink::test::BranchFixture
 {
   protected:
     TreeChanges()

@@ -5,7 +5,7 @@
 
 #include <gtest/gtest.h>
 
-#include "ObstacleTest.hpp"
+#include "ObstacleFixture.hpp"
 #include "support/UnprivilegedUser.hpp"
 #include "support/text.hpp"
 #include "util/repository/repository.hpp"
@@ -19,7 +19,7 @@ using vclink::test::giveToUnprivilegedUser;
 using vclink::test::makeFifo;
 using vclink::test::runAsUnprivilegedUser;
 
-class WorkingCopies : public vclink::test::ObstacleTest
+class WorkingCopies : public vclink::test::ObstacleFixture
 {
   protected:
     std::string blockerOf(const std::string &name) const

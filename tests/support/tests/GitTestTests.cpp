@@ -9,7 +9,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "support/GitTest.hpp"
+#include "support/GitFixture.hpp"
 
 namespace
 {
@@ -33,7 +33,7 @@ std::map<std::string, std::string> filesBelow(const fs::path &folder)
     return files;
 }
 
-class GitRepositoryTest : public vclink::test::GitTest
+class GitRepositoryTest : public vclink::test::GitFixture
 {
 };
 

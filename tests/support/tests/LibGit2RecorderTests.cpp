@@ -10,7 +10,7 @@
 #include <gtest/gtest-spi.h>
 #include <gtest/gtest.h>
 
-#include "support/GitTest.hpp"
+#include "support/GitFixture.hpp"
 #include "support/LibGit2Session.hpp"
 
 namespace
@@ -28,7 +28,7 @@ static_assert(vclink::test::detail::nameOf<git_checkout_tree>() == "git_checkout
 static_assert(vclink::test::detail::nameOf<&git_repository_free>() == "git_repository_free");
 
 /// Calls libgit2 as the library does, in a repository with one untracked file.
-class LibGit2RecorderTest : public vclink::test::GitTest
+class LibGit2RecorderTest : public vclink::test::GitFixture
 {
   protected:
     LibGit2RecorderTest()

@@ -1,0 +1,277 @@
+// SPDX-License-Identifier: MIT
+// The calls to libgit2 of operations on branches and of merges.
+#include <algorithm>
+#include <cstddef>
+#include <cstdint>
+#include <iterator>
+#include <string>
+#include <tuple>
+
+#include <git2.h>
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include "BranchCallsFixture.hpp"
+#include "error/logging/severity.hpp"
+#include "support/LogCapture.hpp"
+#include "support/libgit2/LibGit2Recorder.hpp"
+#include "support/libgit2Release.hpp"
+
+namespace
+{
+
+namespace git = vclink::git;
+using testing::ElementsAre;
+using testing::IsEmpty;
+using testing::SizeIs;
+using vclink::test::LibGit2Recorder;
+using vclink::test::LogCapture;
+using vclink::test::textOf;
+
+class CallsOnBranches : public vclink::test::BranchCallsFixture
+{
+};
+
+TEST_F(CallsOnBranches, OfAListAreTheseInOrder)
+{
+    LibGit2Recorder calls;
+    branches().getLocalBranches();
+    EXPECT_THAT(calls.steps(),
+                ElementsAre("git_repository_open_ext", "git_branch_iterator_new", "git_branch_next",
+                            "git_reference_free", "git_branch_next", "git_branch_iterator_free",
+                            "git_repository_free"));
+}
+
+TEST_F(CallsOnBranches, OfASwitchAreTheseInOrderWithTheRecordOfASafeCheckout)
+{
+    makeAhead();
+    LibGit2Recorder calls;
+    collectRecords(calls);
+    branches().switchBranch("topic");
+    EXPECT_EQ(
+        calls.steps(),
+        joined({{"git_repository_open_ext", "git_index_open", "git_repository_set_index",
+                 "git_index_set_caps", "git_index_free", "git_branch_lookup", "git_revparse_single",
+                 "git_branch_is_checked_out", "git_checkout_options_init"},
+                lookBeforeASwitch_,
+                {"git_transaction_new", "git_transaction_lock_ref", "git_transaction_free",
+                 "git_checkout_tree", "git_repository_set_head"},
+                endOfTheLook_,
+                {"git_object_free", "git_reference_free", "git_repository_free"}}));
+    ASSERT_THAT(checkouts_, SizeIs(1));
+    expectCheckoutRecord(checkouts_[0], vclink::test::libgit2Release::safeCheckout);
+    EXPECT_THAT(checkoutPaths_[0], IsEmpty());
+}
+
+TEST_F(CallsOnBranches, OfANewBranchAreTheseInOrder)
+{
+    LibGit2Recorder calls;
+    branches().createBranch(git::BranchParameters("new", "main"));
+    EXPECT_THAT(calls.steps(),
+                ElementsAre("git_repository_open_ext", "git_reference_dwim", "git_commit_lookup",
+                            "git_reference_free", "git_branch_create", "git_reference_free",
+                            "git_commit_free", "git_repository_free"));
+}
+
+TEST_F(CallsOnBranches, OfADeletionAreTheseInOrder)
+{
+    repository_.git({"branch", "old"});
+    LibGit2Recorder calls;
+    branches().deleteBranch("old");
+    EXPECT_THAT(calls.steps(),
+                ElementsAre("git_repository_open_ext", "git_branch_lookup", "git_branch_delete",
+                            "git_reference_free", "git_repository_free"));
+}
+
+TEST_F(CallsOnBranches, OfTheCurrentBranchAreTheseInOrder)
+{
+    LibGit2Recorder calls;
+    EXPECT_EQ(branches().getCurrentBranch().getName(), "main");
+    EXPECT_THAT(calls.steps(),
+                ElementsAre("git_repository_open_ext", "git_repository_head", "git_branch_name",
+                            "git_reference_free", "git_repository_free"));
+}
+
+class CallsOfAMerge : public vclink::test::BranchCallsFixture
+{
+  protected:
+    void makeConflicts()
+    {
+        repository_.write(".gitattributes", "binary -merge\n");
+        repository_.write("binary", "ancestor\n");
+        repository_.commitAll("attributes");
+        diverge(
+            [this]
+            {
+                repository_.write("file", "ours\n");
+                repository_.write("binary", "ours\n");
+            },
+            [this]
+            {
+                repository_.write("file", "theirs\n");
+                repository_.write("binary", "theirs\n");
+            });
+    }
+    /// Expects the values that libgit2 gives.
+    static void expectUnchanged(const git_merge_options &options)
+    {
+        git_merge_options initial;
+        git_merge_options_init(&initial, GIT_MERGE_OPTIONS_VERSION);
+        const auto members = [](const git_merge_options &from)
+        {
+            return std::tie(from.version, from.flags, from.rename_threshold, from.target_limit,
+                            from.metric, from.recursion_limit, from.default_driver, from.file_favor,
+                            from.file_flags);
+        };
+        EXPECT_EQ(members(options), members(initial));
+    }
+};
+
+TEST_F(CallsOfAMerge, OfAFastForwardAreTheseInOrder)
+{
+    makeAhead();
+    LibGit2Recorder calls;
+    collectRecords(calls);
+    calls.on<git_reference_set_target>(
+        [](git_reference **, git_reference *, const git_oid *, const char *message)
+        { EXPECT_EQ(message, nullptr) << "and nothing for the reflog"; });
+    merge("topic");
+    EXPECT_EQ(calls.steps(),
+              joined({{"git_repository_open_ext", "git_repository_state", "git_revparse_single",
+                       "git_oid_cpy", "git_object_free", "git_annotated_commit_lookup",
+                       "git_merge_analysis", "git_index_open", "git_repository_set_index",
+                       "git_index_set_caps", "git_index_free", "git_repository_state",
+                       "git_repository_head", "git_graph_descendant_of", "git_object_lookup",
+                       "git_checkout_options_init"},
+                      lookBeforeASwitch_,
+                      {"git_transaction_new", "git_transaction_lock_ref", "git_transaction_free",
+                       "git_repository_head", "git_reference_free", "git_checkout_tree",
+                       "git_reference_set_target", "git_reference_free"},
+                      endOfTheLook_,
+                      {"git_object_free", "git_reference_free", "git_annotated_commit_free",
+                       "git_repository_free"}}));
+    ASSERT_THAT(checkouts_, SizeIs(1));
+    expectCheckoutRecord(checkouts_[0], vclink::test::libgit2Release::safeCheckout);
+    EXPECT_THAT(checkoutPaths_[0], IsEmpty());
+}
+
+TEST_F(CallsOfAMerge, OfAMergeThatIsUpToDateStopAtTheAnalysis)
+{
+    LibGit2Recorder calls;
+    merge("main");
+    EXPECT_THAT(calls.steps(), ElementsAre("git_repository_open_ext", "git_repository_state",
+                                           "git_revparse_single", "git_oid_cpy", "git_object_free",
+                                           "git_annotated_commit_lookup", "git_merge_analysis",
+                                           "git_annotated_commit_free", "git_repository_free"));
+}
+
+TEST_F(CallsOfAMerge, OfAMergeThatFailsReleaseAllBeforeTheExceptionIsMade)
+{
+    makeDiverged();
+    LibGit2Recorder calls;
+    calls.fail({{"git_merge", GIT_ERROR}});
+    LogCapture log(git::SeverityException);
+    std::string last;
+    log.onRecord([&](const vclink::test::LogRecord &) { last = calls.steps().back(); });
+    failureOfMerge("topic");
+    EXPECT_EQ(last, "git_repository_free");
+}
+
+/// No bit is set then, and the merge is a true one.
+TEST_F(CallsOfAMerge, OfTheAnalysisMayFail)
+{
+    makeAhead();
+    const std::string head = idOf("HEAD");
+    {
+        LibGit2Recorder calls;
+        calls.fail({{"git_merge_analysis", GIT_ERROR}});
+        const LogCapture log(git::SeverityDiagnostic);
+        merge("topic");
+        EXPECT_THAT(log.messages(),
+                    testing::IsSupersetOf({"Merge Analysis: ", "Merge Preference: "}));
+    }
+    EXPECT_THAT(parents(), ElementsAre(head, idOf("topic")));
+}
+
+/// Those of a merge that has no conflicts, before the commit.
+TEST_F(CallsOfAMerge, OfACleanMergeAreTheseInOrder)
+{
+    makeDiverged();
+    LibGit2Recorder calls;
+    collectRecords(calls);
+    merge("topic");
+    const Calls expected =
+        joined({{"git_repository_open_ext", "git_repository_state", "git_revparse_single",
+                 "git_oid_cpy", "git_object_free", "git_annotated_commit_lookup",
+                 "git_merge_analysis", "git_checkout_options_init", "git_merge_options_init",
+                 "git_index_open", "git_repository_set_index", "git_index_set_caps",
+                 "git_index_free", "git_repository_state"},
+                lookBeforeAMerge_,
+                {"git_reference_name_to_id", "git_oid_fmt", "git_oid_fmt", "git_merge",
+                 "git_oid_fmt", "git_repository_index", "git_index_has_conflicts",
+                 "git_reference_dwim", "git_reference_free", "git_repository_open_ext"}});
+    ASSERT_GE(calls.steps().size(), expected.size());
+    const auto size = static_cast<std::ptrdiff_t>(expected.size());
+    const Calls first(calls.steps().begin(), calls.steps().begin() + size);
+    EXPECT_EQ(first, expected);
+    const Calls last(calls.steps().end() - 5, calls.steps().end());
+    EXPECT_EQ(last, joined({{"git_index_free"},
+                            endOfTheLook_,
+                            {"git_annotated_commit_free", "git_repository_free"}}));
+    ASSERT_THAT(checkouts_, SizeIs(1));
+    expectCheckoutRecord(checkouts_[0], 18);
+    EXPECT_THAT(checkoutPaths_[0], IsEmpty());
+    expectUnchanged(merges_.at(0));
+}
+
+TEST_F(CallsOfAMerge, OfConflictsAreTheseInOrderAndTheSecondCheckoutTakesOurs)
+{
+    makeConflicts();
+    LibGit2Recorder calls;
+    collectRecords(calls);
+    calls.on<git_attr_get>([](const char **, git_repository *, std::uint32_t flags, const char *,
+                              const char *) { EXPECT_EQ(flags, 0U); });
+    expectConflicts("topic");
+    const auto begin =
+        std::find(calls.steps().begin(), calls.steps().end(), "git_index_has_conflicts");
+    const auto end = std::find(begin, calls.steps().end(), "git_repository_free");
+    EXPECT_EQ(std::count(begin, end, "git_attr_get"), 12) << "two attributes of three stages twice";
+    Calls others;
+    std::copy_if(begin, end, std::back_inserter(others),
+                 [](const std::string &name) { return name.rfind("git_attr_", 0) != 0; });
+    EXPECT_THAT(others, ElementsAre("git_index_has_conflicts", "git_index_conflict_iterator_new",
+                                    "git_index_conflict_next", "git_index_conflict_next",
+                                    "git_index_conflict_next", "git_index_conflict_iterator_free",
+                                    "git_checkout_index", "git_index_free", "git_tree_free",
+                                    "git_index_free", "git_annotated_commit_free"));
+    ASSERT_THAT(checkouts_, SizeIs(2));
+    expectCheckoutRecord(checkouts_[0], 18);
+    expectCheckoutRecord(checkouts_[1], 18 | 2048);
+    EXPECT_THAT(checkoutPaths_[0], IsEmpty());
+    EXPECT_THAT(checkoutPaths_[1], ElementsAre("binary", "binary", "binary"))
+        << "once for each stage";
+}
+
+TEST_F(CallsOfAMerge, OfTheSecondCheckoutAreToldInPlaceOfTheConflicts)
+{
+    makeConflicts();
+    LibGit2Recorder calls;
+    calls.fail({{"git_checkout_index", GIT_ERROR}});
+    EXPECT_EQ(failureOfMerge("topic"), textOf(injected_));
+    EXPECT_EQ(branches().getRepositoryState(), "Conflicts");
+    EXPECT_THAT(repository_.read("binary"), testing::HasSubstr("<<<<<<<"));
+}
+
+TEST_F(CallsOfAMerge, OfAttributesMayFailAndCountAsNoAttribute)
+{
+    makeConflicts();
+    LibGit2Recorder calls;
+    collectRecords(calls);
+    calls.fail({{"git_attr_get", GIT_ERROR}});
+    const LogCapture log(git::SeverityDiagnostic);
+    expectConflicts("topic");
+    EXPECT_THAT(checkouts_, SizeIs(1));
+    EXPECT_THAT(repository_.read("binary"), testing::HasSubstr("<<<<<<<"));
+}
+
+} // namespace

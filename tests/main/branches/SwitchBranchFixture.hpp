@@ -1,0 +1,79 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <filesystem>
+#include <string>
+#include <typeinfo>
+
+#include <gtest/gtest.h>
+
+#include "BranchFixture.hpp"
+#include "error/errorUtil/callbackException.hpp"
+#include "vclink/util/exception/CancelledOperationException.hpp"
+
+namespace vclink::test
+{
+
+/// "main" with the files "a", "b" and "same", and "topic" that changes "a", drops "b" and has
+/// "folder/new".
+class SwitchBranchFixture : public BranchFixture
+{
+  protected:
+    SwitchBranchFixture()
+    {
+        for (const auto *name : {"a", "b", "same"})
+            repository_.write(name, "of main\n");
+        repository_.commitAll("first");
+        repository_.git({"checkout", "--quiet", "-b", "topic"});
+        repository_.write("a", "of topic, and longer\n");
+        repository_.remove("b");
+        repository_.write("folder/new", "x");
+        repository_.commitAll("topic");
+        repository_.git({"checkout", "--quiet", "main"});
+    }
+
+    void switchTo(const std::string &name) const
+    {
+        branches().switchBranch(name);
+    }
+    /// What `git checkout` makes of a copy of the working copy as it is now.
+    RepositoryState stateAfterGit(const std::string &name) const
+    {
+        const GitRepository twin(folder() / "twin");
+        std::filesystem::copy(repository_.path(), twin.path(),
+                              std::filesystem::copy_options::recursive |
+                                  std::filesystem::copy_options::copy_symlinks);
+        twin.git({"checkout", "--quiet", name});
+        RepositoryState state = stateOf(twin);
+        std::filesystem::remove_all(twin.path());
+        return state;
+    }
+    /// Everything but the words of the reflog.
+    static void expectSame(RepositoryState state, RepositoryState expected)
+    {
+        state.reflog.clear();
+        expected.reflog.clear();
+        EXPECT_EQ(state, expected);
+    }
+    void expectRefused(const std::string &name, const Failure &failure) const
+    {
+        const NothingChanges nothing(repository_);
+        EXPECT_EQ(failureOf([&] { switchTo(name); }), failure);
+    }
+    void expectCancelled(const std::string &name) const
+    {
+        try
+        {
+            switchTo(name);
+            ADD_FAILURE() << "nothing was raised";
+        }
+        catch (const std::exception &exception)
+        {
+            EXPECT_EQ(typeid(exception),
+                      typeid(vclink::util::exception::CancelledOperationException));
+        }
+        EXPECT_EQ(git::pendingCallbackException(), nullptr);
+    }
+};
+
+} // namespace vclink::test

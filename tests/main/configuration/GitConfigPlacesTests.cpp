@@ -1,0 +1,119 @@
+// SPDX-License-Identifier: MIT
+#include <functional>
+#include <map>
+#include <memory>
+#include <string>
+#include <type_traits>
+
+#include <git2.h>
+#include <gtest/gtest.h>
+
+#include "GitConfigFixture.hpp"
+#include "support/Descriptors.hpp"
+#include "vclink/git/LibGit2Exception.hpp"
+
+namespace
+{
+
+using vclink::git::GitConfig;
+using vclink::test::shown;
+
+/// Where libgit2 looks when it starts.
+class GitConfigPlaces : public vclink::test::GitConfigFixture
+{
+  protected:
+    /// What the diff tool's value is, or the code of the constructor's failure.
+    static std::string describe()
+    {
+        try
+        {
+            const GitConfig config;
+            return shown(config.readDiffTool()) +
+                   (config.globalFilePath() ? ", path" : ", no path");
+        }
+        catch (const vclink::git::LibGit2Exception &exception)
+        {
+            return "raised " + std::to_string(exception.getError().getCode());
+        }
+    }
+};
+
+TEST_F(GitConfigPlaces, OfWhichThereAreNoneMakeTheConstructorRaise)
+{
+    EXPECT_EQ(runIn({{"HOME", ""}, {"XDG_CONFIG_HOME", ""}}, describe),
+              "raised " + std::to_string(GIT_ENOTFOUND));
+}
+
+TEST_F(GitConfigPlaces, WithTheXdgFolderAloneAreEnoughOnceItHasAFile)
+{
+    const std::map<std::string, std::string> environment{
+        {"HOME", ""}, {"XDG_CONFIG_HOME", xdg().parent_path().parent_path()}};
+    EXPECT_EQ(runIn(environment, describe), "raised " + std::to_string(GIT_ENOTFOUND));
+    writeFile(xdg(), "[difftool \"vkDiff\"]\n\tcmd = of the folder\n");
+    EXPECT_EQ(runIn(environment, describe), "of the folder, no path");
+}
+
+TEST_F(GitConfigPlaces, WithTheHomeFolderAreEnoughWithoutAnyFile)
+{
+    const std::string home = environment().home();
+    EXPECT_EQ(runIn({{"HOME", home}, {"XDG_CONFIG_HOME", ""}}, describe), "no value, no path");
+    writeFile(global(), "[difftool \"vkDiff\"]\n\tcmd = of the home\n");
+    EXPECT_EQ(runIn({{"HOME", home}, {"XDG_CONFIG_HOME", ""}}, describe), "of the home, path");
+}
+
+TEST_F(GitConfigPlaces, HaveTheXdgFolderInTheHomeFolderByDefault)
+{
+    writeFile(xdg(), "[difftool \"vkDiff\"]\n\tcmd = of the folder\n");
+    EXPECT_EQ(runIn({{"HOME", environment().home()}, {"XDG_CONFIG_HOME", ""}}, describe),
+              "of the folder, no path");
+}
+
+class GitConfigObject : public vclink::test::GitConfigFixture
+{
+};
+
+TEST_F(GitConfigObject, HoldsOnePointer)
+{
+    using Erased = std::unique_ptr<int, std::function<void(int *)>>;
+    EXPECT_EQ(sizeof(GitConfig), sizeof(Erased));
+}
+
+TEST_F(GitConfigObject, IsNotCopied)
+{
+    EXPECT_FALSE(std::is_copy_constructible_v<GitConfig>);
+    EXPECT_FALSE(std::is_copy_assignable_v<GitConfig>);
+}
+
+TEST_F(GitConfigObject, KeepsLibGit2Alive)
+{
+    const auto starts = []
+    {
+        const int count = git_libgit2_init() - 1;
+        git_libgit2_shutdown();
+        return count;
+    };
+    const int before = starts();
+    {
+        const GitConfig config;
+        EXPECT_EQ(starts(), before + 1);
+    }
+    EXPECT_EQ(starts(), before);
+}
+
+TEST_F(GitConfigObject, LeavesNothingBehindWhenItCannotBeMade)
+{
+    writeFile(global(), "[broken\n");
+    const auto starts = []
+    {
+        const int count = git_libgit2_init() - 1;
+        git_libgit2_shutdown();
+        return count;
+    };
+    EXPECT_THROW(GitConfig(), vclink::git::LibGit2Exception);
+    const int before = starts();
+    const vclink::test::NoDescriptorLeak noLeak;
+    EXPECT_THROW(GitConfig(), vclink::git::LibGit2Exception);
+    EXPECT_EQ(starts(), before);
+}
+
+} // namespace

@@ -1,0 +1,391 @@
+// SPDX-License-Identifier: MIT
+#include <filesystem>
+#include <string>
+#include <vector>
+
+#include <boost/filesystem/exception.hpp>
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include "StagingFixture.hpp"
+
+namespace
+{
+
+namespace fs = std::filesystem;
+using shared_vclink::git::AlreadyAdded;
+using testing::ElementsAre;
+using vclink::test::asPath;
+using vclink::test::expectRefusal;
+using vclink::test::indexOf;
+using vclink::test::NothingChanges;
+using vclink::test::RepositoryState;
+using vclink::test::States;
+
+class AddFiles : public vclink::test::StagingFixture
+{
+  protected:
+    void expectRefuses(const std::vector<std::string> &refused,
+                       const std::vector<std::string> &names) const
+    {
+        expectRefusal<AlreadyAdded>(inRoot(refused), [&] { add(names); });
+    }
+};
+
+TEST_F(AddFiles, BeginsToTrackANewFile)
+{
+    repository_.write("new", "x");
+    add({"new"});
+    EXPECT_THAT(status(), ElementsAre("A  new"));
+    EXPECT_EQ(states(repository_, {"new"}), (States{{"new", "Added"}}));
+}
+
+TEST_F(AddFiles, LeavesTheRepositoryAsGitWould)
+{
+    repository_.write("new", "x");
+    repository_.write("sub/deep/new", "y");
+    repository_.write("left", "z");
+    const RepositoryState expected = stateAfterGit({{"add", "new", "sub/deep/new"}});
+    add({"sub/deep/new", "new"});
+    EXPECT_EQ(stateOf(repository_), expected);
+}
+
+TEST_F(AddFiles, WorksInARepositoryWithoutACommit)
+{
+    const auto empty = makeRepository("empty");
+    empty.write("new", "x");
+    makeAdapter(empty.path())->addFiles({asPath(empty / "new")});
+    EXPECT_EQ(empty.git({"status", "--porcelain"}), "A  new\n");
+}
+
+TEST_F(AddFiles, WorksInALinkedWorktree)
+{
+    const std::string linked = folder() / "linked";
+    repository_.git({"worktree", "add", "--quiet", linked});
+    const vclink::test::GitRepository worktree(linked);
+    worktree.write("new", "x");
+    const NothingChanges inTheMainOne(repository_);
+    makeAdapter(linked)->addFiles({asPath(worktree / "new")});
+    EXPECT_EQ(worktree.git({"status", "--porcelain"}), "A  new\n");
+}
+
+TEST_F(AddFiles, WorksBelowARootThatIsReachedThroughALink)
+{
+    repository_.symlink("repository", "../link");
+    repository_.write("sub/new", "x");
+    repository_.write("left", "x");
+    const std::string root = folder() / "link";
+    makeAdapter(root)->addFiles({asPath(root + "/sub/new")});
+    EXPECT_THAT(status(), ElementsAre("A  sub/new", "?? left"));
+}
+
+TEST_F(AddFiles, DoesNothingForAnEmptyList)
+{
+    const NothingChanges nothing(repository_);
+    add({});
+}
+
+TEST_F(AddFiles, OpensNothingForAnEmptyList)
+{
+    EXPECT_NO_THROW(makeAdapter(folder() / "missing")->addFiles({}));
+}
+
+TEST_F(AddFiles, RefusesAFileThatGitKnows)
+{
+    repository_.write("other", "edited");
+    const NothingChanges nothing(repository_);
+    expectRefuses({"file"}, {"file"});
+    expectRefuses({"other"}, {"other"});
+}
+
+TEST_F(AddFiles, AddsNothingWhenOneOfTheFilesIsRefused)
+{
+    repository_.write("new", "x");
+    const NothingChanges nothing(repository_);
+    expectRefuses({"file"}, {"new", "file"});
+    expectRefuses({"file"}, {"file", "new"});
+    EXPECT_EQ(states(repository_, {"new"}), (States{{"new", "Unversioned"}}));
+}
+
+TEST_F(AddFiles, RefusesAFileInAnyStateButUnversioned)
+{
+    repository_.write("gone", "x");
+    repository_.commitAll("second");
+    beginMerge({"conflicted"});
+    repository_.write("file", "edited");
+    repository_.write("added", "x");
+    repository_.git({"add", "--force", "added"});
+    repository_.write("intended", "x");
+    repository_.git({"add", "--intent-to-add", "intended"});
+    repository_.git({"rm", "--quiet", "--cached", "other"});
+    repository_.remove("gone");
+    repository_.remove("sub/inside");
+    repository_.symlink("nowhere", "sub/inside");
+    const std::vector<std::string> names{"added",    "conflicted", "file",      "gone",
+                                         "intended", "other",      "sub/inside"};
+    EXPECT_EQ(states(repository_, names), (States{{"added", "Added"},
+                                                  {"conflicted", "InConflict"},
+                                                  {"file", "Modified"},
+                                                  {"gone", "Missing"},
+                                                  {"intended", "Added"},
+                                                  {"other", "Deleted"},
+                                                  {"sub/inside", "Unknown"}}));
+    const NothingChanges nothing(repository_);
+    for (const auto &name : names)
+        expectRefuses({name}, {name});
+    expectRefuses(names, names);
+}
+
+TEST_F(AddFiles, ReportsTheRefusedOnesInTheOrderOfPaths)
+{
+    for (const auto *name : {"a-b", "a/x", "a.b", "B", "\xC3\xBC"})
+        repository_.write(name, "x");
+    repository_.commitAll("second");
+    expectRefuses({"B", "a/x", "a-b", "a.b", "\xC3\xBC"},
+                  {"\xC3\xBC", "a.b", "a-b", "B", "a/x", "B", "./a-b"});
+}
+
+TEST_F(AddFiles, ReportsTheRefusedOnesBelowTheRootAsItWasGiven)
+{
+    repository_.symlink("repository", "../link");
+    const std::string root = folder() / "link";
+    expectRefusal<AlreadyAdded>({root + "/file"},
+                                [&] { makeAdapter(root)->addFiles({asPath(root + "/file")}); });
+}
+
+TEST_F(AddFiles, RefusesWithTheCataloguesText)
+{
+    try
+    {
+        add({"sub/inside", "file"});
+        FAIL() << "no exception";
+    }
+    catch (const vclink::git::TagException<AlreadyAdded> &exception)
+    {
+        EXPECT_EQ(exception.GetBaseMsgIDObj().getKey(), "AlreadyAdded");
+        EXPECT_EQ(vclink::test::asUtf8(exception.GetUnicodeMessageTxt()),
+                  "Nothing was added, because these files are not new to Git:\n" +
+                      (repository_ / "file").string() + "\n" +
+                      (repository_ / "sub/inside").string());
+    }
+}
+
+TEST_F(AddFiles, PassesOverAnIgnoredFile)
+{
+    repository_.write(".git/info/exclude", "*.o\n");
+    repository_.write("a.o", "x");
+    repository_.write("new", "x");
+    {
+        const NothingChanges nothing(repository_);
+        add({"a.o"});
+    }
+    add({"a.o", "new"});
+    EXPECT_THAT(status(), ElementsAre("A  new"));
+}
+
+TEST_F(AddFiles, PassesOverANameThatDoesNotExist)
+{
+    repository_.write("new", "x");
+    {
+        const NothingChanges nothing(repository_);
+        add({"missing", "missing/below", "file/below"});
+    }
+    add({"missing", "new"});
+    EXPECT_THAT(status(), ElementsAre("A  new"));
+}
+
+TEST_F(AddFiles, PassesOverWhatLiesOutside)
+{
+    repository_.write("../outside", "x");
+    repository_.write("new", "x");
+    const NothingChanges nothing(repository_);
+    add({"../outside", "../repository2/new"});
+    makeAdapter(repository_.path())->addFiles({asPath("/"), asPath("/new"), asPath("/*")});
+}
+
+TEST_F(AddFiles, TakesAnEmptyPathAndTheRootForNothing)
+{
+    repository_.write("new", "x");
+    repository_.write("left", "x");
+    const auto adapter = makeAdapter(repository_.path());
+    {
+        const NothingChanges nothing(repository_);
+        adapter->addFiles({upath()});
+        adapter->addFiles({asPath(repository_.path())});
+        adapter->addFiles({asPath(repository_ / "."), asPath("missing/relative")});
+    }
+    adapter->addFiles({upath(), asPath(repository_ / "new"), asPath(repository_.path())});
+    EXPECT_THAT(status(), ElementsAre("A  new", "?? left"));
+}
+
+TEST_F(AddFiles, TakesAFolderForAllBelowIt)
+{
+    repository_.write(".git/info/exclude", "*.o\n");
+    for (const auto *name : {"dir/a", "dir/deep/b", "dir/a.o", "dir/#c", "directory"})
+        repository_.write(name, "x");
+    add({"dir"});
+    EXPECT_THAT(status(), ElementsAre("A  dir/#c", "A  dir/a", "A  dir/deep/b", "?? directory"));
+}
+
+TEST_F(AddFiles, RefusesAFolderWithAFileThatGitKnows)
+{
+    repository_.write("sub/new", "x");
+    const NothingChanges nothing(repository_);
+    expectRefuses({"sub/inside"}, {"sub"});
+}
+
+/// Below it nothing is meant, which names the limit of what a list can say.
+TEST_F(AddFiles, TakesAFolderWithADangerousNameForItsOwnEntry)
+{
+    for (const auto *name : {"#dir/a", "!dir/a", "dir /a"})
+        repository_.write(name, "x");
+    {
+        const NothingChanges nothing(repository_);
+        add({"#dir", "!dir", "dir "});
+    }
+    add({"#dir/a", "dir /a"});
+    EXPECT_THAT(status(), ElementsAre("A  #dir/a", "A  dir /a", "?? !dir/a"));
+}
+
+TEST_F(AddFiles, KeepsTheExecutableBit)
+{
+    repository_.write("tool", "x");
+    repository_.setMode("tool", 0755);
+    const RepositoryState expected = stateAfterGit({{"add", "tool"}});
+    add({"tool"});
+    EXPECT_EQ(stateOf(repository_), expected);
+    EXPECT_EQ(indexOf(repository_).at("tool").substr(0, 8), "H 100755");
+}
+
+TEST_F(AddFiles, DropsAnExecutableBitThatDoesNotCount)
+{
+    repository_.git({"config", "core.fileMode", "false"});
+    repository_.write("tool", "x");
+    repository_.setMode("tool", 0755);
+    add({"tool"});
+    EXPECT_EQ(indexOf(repository_).at("tool").substr(0, 8), "H 100644");
+}
+
+TEST_F(AddFiles, ConvertsLineEndsAsTheAttributesSay)
+{
+    repository_.write(".gitattributes", "*.txt text eol=crlf\n*.bin -text\nauto text=auto\n");
+    repository_.write("a.txt", "one\r\ntwo\r\n");
+    repository_.write("a.bin", "one\r\ntwo\r\n");
+    repository_.write("auto", "one\r\ntwo\r\n");
+    const RepositoryState expected = stateAfterGit({{"add", "a.txt", "a.bin", "auto"}});
+    add({"a.txt", "a.bin", "auto"});
+    EXPECT_EQ(stateOf(repository_), expected);
+    EXPECT_EQ(repository_.git({"show", ":a.txt"}), "one\ntwo\n");
+    EXPECT_EQ(repository_.git({"show", ":a.bin"}), "one\r\ntwo\r\n");
+}
+
+TEST_F(AddFiles, TakesALinkForItsTarget)
+{
+    repository_.write("target", "x");
+    repository_.symlink("target", "link");
+    repository_.symlink("file", "known");
+    add({"link"});
+    EXPECT_THAT(status(), ElementsAre("A  target", "?? known", "?? link"));
+    const NothingChanges nothing(repository_);
+    expectRefuses({"file"}, {"known"});
+}
+
+TEST_F(AddFiles, TakesALinkThatLeadsNowhereForItself)
+{
+    repository_.symlink("nowhere", "link");
+    const RepositoryState expected = stateAfterGit({{"add", "link"}});
+    add({"link"});
+    EXPECT_EQ(stateOf(repository_), expected);
+    EXPECT_EQ(indexOf(repository_).at("link").substr(0, 8), "H 120000");
+}
+
+/// The files that the folder stands for are looked up by name once more.
+TEST_F(AddFiles, TakesALinkAmongTheFilesOfAFolderForItsTarget)
+{
+    repository_.write("target", "x");
+    repository_.write("dir/new", "x");
+    repository_.symlink("../target", "dir/link");
+    add({"dir"});
+    EXPECT_THAT(status(), ElementsAre("A  dir/new", "A  target", "?? dir/link"));
+}
+
+TEST_F(AddFiles, RaisesOnALoopOfLinks)
+{
+    repository_.symlink("loop", "loop");
+    repository_.write("new", "x");
+    const NothingChanges nothing(repository_);
+    EXPECT_THROW(add({"new", "loop"}), boost::filesystem::filesystem_error);
+}
+
+TEST_F(AddFiles, TakesTheFileOfAFolderThatWasAFile)
+{
+    repository_.remove("file");
+    repository_.write("file/inside", "x");
+    {
+        const NothingChanges nothing(repository_);
+        expectRefuses({"file"}, {"file"});
+    }
+    const RepositoryState expected = stateAfterGit({{"add", "file/inside"}});
+    add({"file/inside"});
+    EXPECT_EQ(stateOf(repository_), expected);
+    EXPECT_EQ(indexOf(repository_).count("file"), 0U);
+}
+
+TEST_F(AddFiles, RefusesAFileThatWasAFolder)
+{
+    repository_.remove("sub");
+    repository_.write("sub", "x");
+    const NothingChanges nothing(repository_);
+    expectRefuses({"sub/inside"}, {"sub"});
+}
+
+TEST_F(AddFiles, RefusesASubmoduleThatGitKnows)
+{
+    auto inner = makeRepository("inner");
+    inner.write("file", "x");
+    inner.commitAll("first");
+    repository_.git({"submodule", "--quiet", "add", inner.path().string(), "module"});
+    repository_.commit("second");
+    repository_.write("module/new", "x");
+    const NothingChanges nothing(repository_);
+    expectRefuses({"module"}, {"module"});
+    add({"module/new"});
+}
+
+TEST_F(AddFiles, LeavesAllOtherEntriesAsTheyAre)
+{
+    beginMerge({"file"});
+    repository_.write("edited", "x");
+    repository_.git({"add", "edited"});
+    repository_.write("edited", "edited since");
+    repository_.write("intended", "x");
+    repository_.git({"add", "--intent-to-add", "intended"});
+    repository_.git({"update-index", "--skip-worktree", "other"});
+    repository_.git({"update-index", "--assume-unchanged", "sub/inside"});
+    repository_.remove("other");
+    repository_.write("new", "x");
+    const RepositoryState expected = stateAfterGit({{"add", "new"}});
+    add({"new"});
+    EXPECT_EQ(stateOf(repository_), expected);
+}
+
+TEST_F(AddFiles, AddsNothingToABareRepository)
+{
+    const std::string bare = folder() / "bare";
+    repository_.git({"clone", "--quiet", "--bare", repository_.path().string(), bare});
+    EXPECT_NO_THROW(makeAdapter(bare)->addFiles({asPath(bare + "/config")}));
+    EXPECT_FALSE(fs::exists(bare + "/index"));
+}
+
+TEST_F(AddFiles, CountsALaterEditAsAChangeOfAnAddedFile)
+{
+    repository_.write("new", "x");
+    add({"new"});
+    repository_.write("new", "edited since");
+    EXPECT_THAT(status(), ElementsAre("AM new"));
+    EXPECT_EQ(repository_.git({"show", ":new"}), "x");
+    const NothingChanges nothing(repository_);
+    expectRefuses({"new"}, {"new"});
+}
+
+} // namespace

@@ -1,0 +1,388 @@
+// SPDX-License-Identifier: MIT
+#include <algorithm>
+#include <cstddef>
+#include <cstdlib>
+#include <memory>
+#include <ostream>
+#include <string>
+#include <vector>
+
+#include <git2.h>
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include "CommitFixture.hpp"
+#include "support/libgit2/LibGit2Recorder.hpp"
+
+namespace
+{
+
+using testing::Contains;
+using testing::ElementsAre;
+using testing::IsEmpty;
+using testing::Not;
+using vclink::test::Failure;
+using vclink::test::failureOf;
+using vclink::test::LibGit2Recorder;
+using vclink::test::NothingChanges;
+using vclink::test::RepositoryState;
+using vclink::test::stateOf;
+
+class CommitCalls : public vclink::test::CommitFixture
+{
+  protected:
+    CommitCalls()
+    {
+        adapter_ = makeAdapter(repository_.path());
+    }
+
+    void commitOnce()
+    {
+        adapter_->commit(upath(), u"message");
+    }
+    void startNoting()
+    {
+        calls_.reset();
+        calls_ = std::make_unique<LibGit2Recorder>();
+    }
+
+    std::unique_ptr<vclink::git::GitAdapter> adapter_;
+    std::unique_ptr<LibGit2Recorder> calls_;
+};
+
+TEST_F(CommitCalls, ComeInTheirOrderAndReleaseInReverse)
+{
+    startNoting();
+    commitOnce();
+    EXPECT_THAT(calls_->steps(),
+                ElementsAre("git_repository_open_ext", "git_index_open", "git_repository_set_index",
+                            "git_index_set_caps", "git_index_free", "git_reference_dwim",
+                            "git_commit_lookup", "git_reference_free", "git_repository_state",
+                            "git_signature_default", "git_repository_index", "git_index_update_all",
+                            "git_index_write", "git_index_write_tree", "git_tree_lookup",
+                            "git_commit_create", "git_object_lookup",
+                            "git_repository_state_cleanup", "git_object_free", "git_tree_free",
+                            "git_index_free", "git_signature_free", "git_commit_free",
+                            "git_repository_free"));
+    EXPECT_THAT(calls_->openHandles(), IsEmpty());
+}
+
+TEST_F(CommitCalls, OfAMergeLookUpItsHeadsBeforeAnythingIsTouched)
+{
+    beginMerge({"file"});
+    startNoting();
+    commitOnce();
+    auto first = calls_->steps();
+    ASSERT_GE(first.size(), 12U);
+    first.resize(12);
+    EXPECT_THAT(first,
+                ElementsAre("git_repository_open_ext", "git_index_open", "git_repository_set_index",
+                            "git_index_set_caps", "git_index_free", "git_reference_dwim",
+                            "git_commit_lookup", "git_reference_free", "git_repository_state",
+                            "git_repository_mergehead_foreach", "git_commit_lookup",
+                            "git_signature_default"));
+}
+
+TEST_F(CommitCalls, OfAnUnbornBranchLookUpNoCommit)
+{
+    repository_.git({"checkout", "--quiet", "--orphan", "second"});
+    startNoting();
+    commitOnce();
+    EXPECT_THAT(calls_->steps(), Not(Contains("git_commit_lookup")));
+}
+
+TEST_F(CommitCalls, MakeAnIdentityOnlyWhereNoneIsConfigured)
+{
+    startNoting();
+    commitOnce();
+    EXPECT_THAT(calls_->steps(), Not(Contains("git_signature_now")));
+    repository_.git({"config", "--unset", "user.email"});
+    ::setenv("USER", "builder", 1);
+    startNoting();
+    commitOnce();
+    ASSERT_GE(calls_->steps().size(), 12U);
+    EXPECT_EQ(calls_->steps().at(9), "git_signature_default");
+    EXPECT_EQ(calls_->steps().at(10), "git_signature_now");
+    EXPECT_EQ(calls_->steps().at(11), "git_repository_index");
+}
+
+TEST_F(CommitCalls, RefreshTheWholeIndexWithoutACallback)
+{
+    int count = 0;
+    startNoting();
+    calls_->on<git_index_update_all>(
+        [&](git_index *, const git_strarray *pathspec, git_index_matched_path_cb callback,
+            void *payload)
+        {
+            ++count;
+            EXPECT_EQ(pathspec, nullptr);
+            EXPECT_EQ(callback, nullptr);
+            EXPECT_EQ(payload, nullptr);
+        });
+    commitOnce();
+    EXPECT_EQ(count, 1);
+}
+
+TEST_F(CommitCalls, AskForTheCommitAtHead)
+{
+    std::vector<std::string> asked;
+    startNoting();
+    calls_->on<git_reference_dwim>([&](git_reference **, git_repository *, const char *name)
+                                   { asked.emplace_back(name); });
+    commitOnce();
+    EXPECT_THAT(asked, ElementsAre("HEAD"));
+}
+
+TEST_F(CommitCalls, GiveOneSignatureTwiceAndTheEncodingAlways)
+{
+    int count = 0;
+    startNoting();
+    calls_->on<git_commit_create>(
+        [&](git_oid *, git_repository *, const char *reference, const git_signature *author,
+            const git_signature *committer, const char *encoding, const char *message,
+            const git_tree *, std::size_t parents, const git_commit **)
+        {
+            ++count;
+            EXPECT_STREQ(reference, "HEAD");
+            EXPECT_EQ(author, committer);
+            EXPECT_STREQ(encoding, "UTF-8");
+            EXPECT_STREQ(message, "message");
+            EXPECT_EQ(parents, 1U);
+        });
+    commitOnce();
+    EXPECT_EQ(count, 1);
+}
+
+TEST_F(CommitCalls, ReadTheIndexFileAgainOnlyWhenAnEntryIsGone)
+{
+    startNoting();
+    repository_.write("file", "changed\n");
+    repository_.write("new", "x");
+    commitOnce();
+    // Once for the lock.
+    EXPECT_THAT(calls_->steps(), Contains("git_index_open").Times(1));
+    startNoting();
+    repository_.remove("file");
+    commitOnce();
+    EXPECT_THAT(calls_->steps(), Contains("git_index_open").Times(2));
+    EXPECT_THAT(calls_->steps(), Not(Contains("git_index_add")));
+    EXPECT_THAT(calls_->openHandles(), IsEmpty());
+}
+
+TEST_F(CommitCalls, ReadTheIndexFileAgainBeforeTheyWriteIt)
+{
+    repository_.remove("file");
+    startNoting();
+    commitOnce();
+    auto steps = calls_->steps();
+    const auto lookUps = std::remove(steps.begin(), steps.end(), "git_index_find");
+    EXPECT_EQ(steps.end() - lookUps, 3) << "once for each entry that was there";
+    steps.erase(lookUps, steps.end());
+    ASSERT_GE(steps.size(), 15U);
+    EXPECT_THAT(std::vector<std::string>(steps.begin() + 10, steps.begin() + 15),
+                ElementsAre("git_repository_index", "git_index_update_all", "git_index_open",
+                            "git_index_free", "git_index_write"));
+}
+
+TEST_F(CommitCalls, PutBackOnlyWhatIsNotCheckedOut)
+{
+    repository_.git({"update-index", "--skip-worktree", "file", "sub/inside"});
+    for (const auto *name : {"file", "sub/inside", "other"})
+        repository_.remove(name);
+    startNoting();
+    commitOnce();
+    EXPECT_THAT(calls_->steps(), Contains("git_index_add").Times(2));
+    EXPECT_THAT(namesIn(), ElementsAre("file", "sub/inside"));
+}
+
+TEST_F(CommitCalls, PutBackNothingThatIsStillThere)
+{
+    repository_.git({"update-index", "--skip-worktree", "file", "other"});
+    repository_.remove("file");
+    startNoting();
+    commitOnce();
+    EXPECT_THAT(calls_->steps(), Contains("git_index_add").Times(1));
+    EXPECT_THAT(namesIn(), ElementsAre("file", "other", "sub/inside"));
+}
+
+/// Three stages become one entry, and none is gone.
+TEST_F(CommitCalls, PutNothingBackWhenAConflictEnds)
+{
+    beginMerge({"file"});
+    startNoting();
+    commitOnce();
+    EXPECT_THAT(calls_->steps(), Contains("git_index_open").Times(2));
+    EXPECT_THAT(calls_->steps(), Not(Contains("git_index_add")));
+    EXPECT_THAT(namesIn(), ElementsAre("file", "other", "sub/inside"));
+}
+
+/// HEAD can't be told for whatever reason: libgit2 tells it when the commit is made.
+TEST_F(CommitCalls, GoOnWithoutAParentWhenHeadFails)
+{
+    startNoting();
+    std::size_t parentCount = 99;
+    calls_->on<git_commit_create>(
+        [&](git_oid *, git_repository *, const char *, const git_signature *, const git_signature *,
+            const char *, const char *, const git_tree *, std::size_t parents, const git_commit **)
+        { parentCount = parents; });
+    for (const auto *name : {"git_reference_dwim", "git_commit_lookup"})
+    {
+        calls_->fail({{name, GIT_ERROR}});
+        EXPECT_EQ(failureOf([this] { commitOnce(); }),
+                  (Failure{GIT_EMODIFIED, GIT_ERROR_OBJECT,
+                           "failed to create commit: current tip is not the first parent"}));
+        EXPECT_EQ(parentCount, 0U);
+    }
+}
+
+/// What a failing call leaves behind.
+enum class Survives
+{
+    Everything,
+    AllButTheIndex
+};
+
+struct FailingCall
+{
+    const char *name;
+    Survives survives;
+};
+
+void PrintTo(const FailingCall &call, std::ostream *stream)
+{
+    *stream << call.name;
+}
+
+/// A merge with one conflict, one modified and one deleted file, whose conclusion fails at a call.
+class FailingCommitCall : public CommitCalls, public testing::WithParamInterface<FailingCall>
+{
+  protected:
+    FailingCommitCall()
+    {
+        beginMerge({"file"});
+        repository_.write("sub/inside", "changed\n");
+        repository_.remove("other");
+    }
+};
+
+TEST_P(FailingCommitCall, LeavesTheMergeUnderWayAndReleasesEverything)
+{
+    const RepositoryState before = stateOf(repository_);
+    const auto index = vclink::test::indexStampOf(repository_);
+    RepositoryState expected = before;
+    if (GetParam().survives == Survives::AllButTheIndex)
+        expected.index = stateAfterGit({{"add", "--update"}}).index;
+    startNoting();
+    calls_->fail({{GetParam().name, -42}});
+    EXPECT_EQ(failureOf([this] { commitOnce(); }), (Failure{-42, GIT_ERROR_OS, "injected"}));
+    EXPECT_THAT(calls_->openHandles(), IsEmpty());
+    EXPECT_EQ(stateOf(repository_), expected);
+    const bool isIndexUntouched = vclink::test::indexStampOf(repository_) == index;
+    EXPECT_EQ(isIndexUntouched, GetParam().survives == Survives::Everything);
+}
+
+TEST_P(FailingCommitCall, DoesNotStandInTheWayOfTheNextCommit)
+{
+    startNoting();
+    calls_->fail({{GetParam().name, -42}});
+    failureOf([this] { commitOnce(); });
+    calls_->fail({});
+    commitOnce();
+    EXPECT_EQ(parents().size(), 2U);
+    EXPECT_THAT(namesIn(), ElementsAre("file", "sub/inside"));
+    EXPECT_EQ(committed("sub/inside"), "changed\n");
+}
+
+const std::vector<FailingCall> failingCalls{
+    {"git_repository_open_ext", Survives::Everything},
+    {"git_repository_mergehead_foreach", Survives::Everything},
+    {"git_commit_lookup", Survives::Everything},
+    {"git_signature_default", Survives::Everything},
+    {"git_repository_index", Survives::Everything},
+    {"git_index_update_all", Survives::Everything},
+    {"git_index_open", Survives::Everything},
+    {"git_index_write", Survives::Everything},
+    {"git_index_write_tree", Survives::AllButTheIndex},
+    {"git_tree_lookup", Survives::AllButTheIndex},
+    {"git_commit_create", Survives::AllButTheIndex}};
+
+INSTANTIATE_TEST_SUITE_P(EachCall, FailingCommitCall, testing::ValuesIn(failingCalls),
+                         [](const testing::TestParamInfo<FailingCall> &call)
+                         { return std::string(call.param.name); });
+
+TEST_F(CommitCalls, ThatFailToEndTheMergeLeaveTheCommit)
+{
+    beginMerge({"file"});
+    const std::string head = idOf("HEAD");
+    const auto underWay = stateOf(repository_).underWay;
+    startNoting();
+    calls_->fail({{"git_repository_state_cleanup", -42}});
+    EXPECT_EQ(failureOf([this] { commitOnce(); }), (Failure{-42, GIT_ERROR_OS, "injected"}));
+    EXPECT_THAT(calls_->openHandles(), IsEmpty());
+    EXPECT_THAT(parents(), ElementsAre(head, idOf("theirs")));
+    EXPECT_EQ(stateOf(repository_).underWay, underWay);
+}
+
+TEST_F(CommitCalls, ThatFailToSeeTheCommitHaveEndedTheMerge)
+{
+    beginMerge({"file"});
+    const std::string head = idOf("HEAD");
+    startNoting();
+    calls_->fail({{"git_object_lookup", -42}});
+    EXPECT_EQ(failureOf([this] { commitOnce(); }), (Failure{-42, GIT_ERROR_OS, "injected"}));
+    EXPECT_THAT(calls_->openHandles(), IsEmpty());
+    EXPECT_THAT(parents(), ElementsAre(head, idOf("theirs")));
+    EXPECT_EQ(stateOf(repository_).underWay.count("MERGE_HEAD"), 0U);
+}
+
+TEST_F(CommitCalls, ThatFailForTheIdentityLeaveTheIndexUnopened)
+{
+    repository_.git({"config", "--remove-section", "user"});
+    ::unsetenv("USER");
+    ::unsetenv("LOGNAME");
+    const NothingChanges nothing(repository_);
+    startNoting();
+    EXPECT_THROW(commitOnce(), vclink::git::TagException<shared_vclink::git::NoUserName>);
+    EXPECT_THAT(calls_->steps(), Not(Contains("git_repository_index")));
+    EXPECT_THAT(calls_->openHandles(), IsEmpty());
+}
+
+TEST_F(CommitCalls, RaiseAFailingFallbackIdentity)
+{
+    repository_.git({"config", "--remove-section", "user"});
+    ::setenv("USER", "builder", 1);
+    const NothingChanges nothing(repository_);
+    startNoting();
+    calls_->fail({{"git_signature_now", -42}});
+    EXPECT_EQ(failureOf([this] { commitOnce(); }), (Failure{-42, GIT_ERROR_OS, "injected"}));
+}
+
+/// Only a missing value is a reason to go on without the configuration.
+TEST_F(CommitCalls, RaiseEveryOtherFailureOfTheConfiguredIdentity)
+{
+    ::setenv("USER", "builder", 1);
+    startNoting();
+    for (const int code : {GIT_ERROR, GIT_EINVALID, GIT_ELOCKED})
+    {
+        calls_->fail({{"git_signature_default", code}});
+        EXPECT_EQ(failureOf([this] { commitOnce(); }), (Failure{code, GIT_ERROR_OS, "injected"}));
+    }
+    EXPECT_THAT(calls_->steps(), Not(Contains("git_signature_now")));
+    calls_->fail({{"git_signature_default", GIT_ENOTFOUND}});
+    commitOnce();
+    EXPECT_THAT(calls_->steps(), Contains("git_signature_now"));
+}
+
+TEST_F(CommitCalls, RaiseAFailureToPutBackWhatIsNotCheckedOut)
+{
+    repository_.git({"update-index", "--skip-worktree", "file"});
+    repository_.remove("file");
+    repository_.write("other", "changed\n");
+    const NothingChanges nothing(repository_);
+    startNoting();
+    calls_->fail({{"git_index_add", -42}});
+    EXPECT_EQ(failureOf([this] { commitOnce(); }), (Failure{-42, GIT_ERROR_OS, "injected"}));
+    EXPECT_THAT(calls_->openHandles(), IsEmpty());
+}
+
+} // namespace

@@ -1,0 +1,88 @@
+// SPDX-License-Identifier: MIT
+#include "CommitFixture.hpp"
+
+#include <sstream>
+
+#include "support/UnprivilegedUser.hpp"
+#include "vclink/git/LibGit2Exception.hpp"
+
+namespace vclink::test
+{
+
+CommitFixture::CommitFixture()
+{
+    configureIdentity(repository_);
+}
+
+void CommitFixture::configureIdentity(const GitRepository &repository)
+{
+    repository.git({"config", "user.name", "Test Person"});
+    repository.git({"config", "user.email", "person@example.com"});
+}
+
+void CommitFixture::commit(const std::string &message) const
+{
+    commitIn(repository_, message);
+}
+
+void CommitFixture::commitIn(const GitRepository &repository, const std::string &message) const
+{
+    makeAdapter(repository.path())->commit(upath(), asUtf16(message));
+}
+
+void CommitFixture::giveAway() const
+{
+    // Otherwise git refuses to look at what another user owns.
+    GitRepository(environment().home()).write(".gitconfig", "[safe]\n\tdirectory = *\n");
+    giveToUnprivilegedUser(repository_.path());
+}
+
+std::string CommitFixture::commitAsItsOwner() const
+{
+    return runAsUnprivilegedUser(
+        [this]() -> std::string
+        {
+            try
+            {
+                commit();
+                return "committed";
+            }
+            catch (const git::LibGit2Exception &exception)
+            {
+                const git::GitError &error = exception.getError();
+                return std::to_string(error.getCode()) + ' ' +
+                       std::to_string(error.getErrorClass()) + ' ' + asUtf8(error.getMessage());
+            }
+        });
+}
+
+std::vector<std::string> CommitFixture::namesIn(const std::string &commit) const
+{
+    return linesOf(repository_.git({"ls-tree", "-r", "--name-only", commit}));
+}
+
+std::string CommitFixture::committed(const std::string &name) const
+{
+    return repository_.git({"cat-file", "blob", "HEAD:" + name});
+}
+
+std::vector<std::string> CommitFixture::parents() const
+{
+    return linesOf(repository_.git({"rev-parse", "HEAD^@"}));
+}
+
+std::string CommitFixture::idOf(const std::string &name) const
+{
+    return repository_.line({"rev-parse", "--verify", name});
+}
+
+std::vector<std::string> linesOf(const std::string &text)
+{
+    std::istringstream stream(text);
+    std::vector<std::string> lines;
+    for (std::string line; std::getline(stream, line);)
+        lines.push_back(line);
+    return lines;
+}
+
+} // namespace vclink::test

@@ -1,0 +1,321 @@
+// SPDX-License-Identifier: MIT
+#include <array>
+#include <cstdlib>
+#include <ctime>
+#include <string>
+#include <typeinfo>
+#include <utility>
+
+#include <git2.h>
+#include <gtest/gtest.h>
+#include <unistd.h>
+
+#include "CommitFixture.hpp"
+#include "support/libgit2Release.hpp"
+
+namespace
+{
+
+using shared_vclink::git::NoUserName;
+using vclink::test::Failure;
+using vclink::test::failureOf;
+using vclink::test::GitRepository;
+using vclink::test::NothingChanges;
+
+using NoUserNameException = vclink::git::TagException<NoUserName>;
+
+const Failure emptyIdentity{GIT_ERROR, GIT_ERROR_INVALID,
+                            "failed to parse signature - Signature cannot have an empty name or "
+                            "email"};
+const Failure angleBrackets{GIT_ERROR, GIT_ERROR_INVALID,
+                            "failed to parse signature - Neither `name` nor `email` should contain "
+                            "angle brackets chars."};
+
+const std::string noise(vclink::test::libgit2Release::noiseOfNames);
+
+std::string hostName()
+{
+    std::array<char, 1024> name{};
+    EXPECT_EQ(::gethostname(name.data(), name.size()), 0);
+    return name.data();
+}
+
+void setVariable(const char *name, const std::string &value)
+{
+    ::setenv(name, value.c_str(), 1);
+}
+
+/// Sets the local time zone for a while.
+class TimeZone
+{
+  public:
+    explicit TimeZone(const std::string &zone)
+    {
+        setVariable("TZ", zone);
+        ::tzset();
+    }
+    TimeZone(const TimeZone &) = delete;
+    TimeZone &operator=(const TimeZone &) = delete;
+    ~TimeZone()
+    {
+        ::unsetenv("TZ");
+        ::tzset();
+    }
+};
+
+/// The tests start with neither a name nor an address configured, and no variable set.
+class CommitIdentity : public vclink::test::CommitFixture
+{
+  protected:
+    CommitIdentity()
+    {
+        repository_.git({"config", "--remove-section", "user"});
+        repository_.write("file", "changed\n");
+        repository_.remove("other");
+    }
+
+    void configure(const std::string &key, const std::string &value) const
+    {
+        repository_.git({"config", key, value});
+    }
+    /// "name <address>" of the author of a commit, which is the committer too.
+    std::string identityAfterCommit() const
+    {
+        commit();
+        const std::string author = repository_.line({"log", "-1", "--format=%an <%ae> %at"});
+        EXPECT_EQ(author, repository_.line({"log", "-1", "--format=%cn <%ce> %ct"}));
+        return author.substr(0, author.rfind(' '));
+    }
+    void expectFailure(const Failure &failure) const
+    {
+        const NothingChanges nothing(repository_);
+        EXPECT_EQ(failureOf([this] { commit(); }), failure);
+    }
+};
+
+TEST_F(CommitIdentity, IsTheConfiguredOne)
+{
+    setVariable("USER", "builder");
+    setVariable("LOGNAME", "builder");
+    configure("user.name", "Ann O'Neill");
+    configure("user.email", "ann@example.com");
+    EXPECT_EQ(identityAfterCommit(), "Ann O'Neill <ann@example.com>");
+}
+
+TEST_F(CommitIdentity, NeedsNoVariableWhenItIsConfigured)
+{
+    configure("user.name", "Ann");
+    configure("user.email", "ann@example.com");
+    EXPECT_EQ(identityAfterCommit(), "Ann <ann@example.com>");
+}
+
+TEST_F(CommitIdentity, IsTheUserAtTheHostWhenNothingIsConfigured)
+{
+    setVariable("USER", "builder");
+    EXPECT_EQ(identityAfterCommit(), "builder <builder@" + hostName() + ">");
+}
+
+TEST_F(CommitIdentity, TakesNothingFromAConfiguredNameWithoutAnAddress)
+{
+    setVariable("USER", "builder");
+    configure("user.name", "Ann");
+    EXPECT_EQ(identityAfterCommit(), "builder <builder@" + hostName() + ">");
+}
+
+TEST_F(CommitIdentity, TakesNothingFromAConfiguredAddressWithoutAName)
+{
+    setVariable("USER", "builder");
+    configure("user.email", "ann@example.com");
+    EXPECT_EQ(identityAfterCommit(), "builder <builder@" + hostName() + ">");
+}
+
+TEST_F(CommitIdentity, IsLookedForInTheGlobalConfiguration)
+{
+    GitRepository(environment().home())
+        .write(".gitconfig", "[user]\n\tname = Global\n\temail = global@example.com\n");
+    EXPECT_EQ(identityAfterCommit(), "Global <global@example.com>");
+}
+
+TEST_F(CommitIdentity, IsTheRepositorysOwnOverTheGlobalOne)
+{
+    GitRepository(environment().home())
+        .write(".gitconfig", "[user]\n\tname = Global\n\temail = global@example.com\n");
+    configure("user.name", "Local");
+    EXPECT_EQ(identityAfterCommit(), "Local <global@example.com>");
+    configure("user.email", "local@example.com");
+    EXPECT_EQ(identityAfterCommit(), "Local <local@example.com>");
+}
+
+/// git itself would follow these.
+TEST_F(CommitIdentity, IsNotTakenFromGitsOwnVariables)
+{
+    configure("user.name", "Ann");
+    configure("user.email", "ann@example.com");
+    configure("author.name", "Author");
+    configure("committer.email", "committer@example.com");
+    for (const auto *name : {"GIT_AUTHOR_NAME", "GIT_AUTHOR_EMAIL", "GIT_COMMITTER_NAME",
+                             "GIT_COMMITTER_EMAIL", "EMAIL"})
+        setVariable(name, "variable");
+    setVariable("GIT_AUTHOR_DATE", "1577836800 +0000");
+    EXPECT_EQ(identityAfterCommit(), "Ann <ann@example.com>");
+    EXPECT_NE(repository_.line({"log", "-1", "--format=%at"}), "1577836800");
+}
+
+TEST_F(CommitIdentity, IsTheLogNameWhereTheUserIsUnset)
+{
+    setVariable("LOGNAME", "logger");
+    EXPECT_EQ(identityAfterCommit(), "logger <logger@" + hostName() + ">");
+}
+
+TEST_F(CommitIdentity, IsTheUserWhereTheLogNameIsSetToo)
+{
+    setVariable("USER", "builder");
+    setVariable("LOGNAME", "logger");
+    EXPECT_EQ(identityAfterCommit(), "builder <builder@" + hostName() + ">");
+}
+
+TEST_F(CommitIdentity, OfAnEmptyUserIsRefusedAndTheLogNameNotAsked)
+{
+    setVariable("USER", "");
+    setVariable("LOGNAME", "logger");
+    expectFailure(emptyIdentity);
+}
+
+TEST_F(CommitIdentity, OfAnEmptyLogNameIsRefused)
+{
+    setVariable("LOGNAME", "");
+    expectFailure(emptyIdentity);
+}
+
+TEST_F(CommitIdentity, OfNobodyIsRefusedByAMessageOfItsOwn)
+{
+    const NothingChanges nothing(repository_);
+    try
+    {
+        commit();
+        ADD_FAILURE() << "no exception";
+    }
+    catch (const NoUserNameException &exception)
+    {
+        const vclink::exception::SourceControlException &base = exception;
+        EXPECT_EQ(typeid(base), typeid(NoUserNameException));
+        EXPECT_EQ(exception.GetID(), "shared_vclink:git:NoUserName");
+        EXPECT_EQ(exception.GetBaseMsgIDObj().getCatalogue(), "shared_vclink:git");
+        EXPECT_EQ(exception.GetBaseMsgIDObj().getKey(), "NoUserName");
+        EXPECT_TRUE(exception.GetBaseMsgIDObj().getArguments().empty());
+    }
+}
+
+TEST_F(CommitIdentity, OfNobodyIsRefusedAlsoWhereOneHalfIsConfigured)
+{
+    const auto expectRefused = [this]
+    {
+        const NothingChanges nothing(repository_);
+        EXPECT_THROW(commit(), NoUserNameException);
+    };
+    configure("user.name", "Ann");
+    expectRefused();
+    repository_.git({"config", "--unset", "user.name"});
+    configure("user.email", "ann@example.com");
+    expectRefused();
+}
+
+TEST_F(CommitIdentity, OfNobodyIsRefusedInAnEmptyRepositoryToo)
+{
+    const auto empty = makeRepository("empty");
+    empty.write("added", "x");
+    empty.add({"added"});
+    const NothingChanges nothing(empty);
+    EXPECT_THROW(commitIn(empty), NoUserNameException);
+}
+
+TEST_F(CommitIdentity, OfAConfiguredEmptyNameIsRefused)
+{
+    setVariable("USER", "builder");
+    configure("user.email", "ann@example.com");
+    for (const std::string &name : {std::string(), std::string("   "), noise})
+    {
+        configure("user.name", name);
+        expectFailure(emptyIdentity);
+    }
+}
+
+TEST_F(CommitIdentity, OfAConfiguredEmptyAddressIsRefused)
+{
+    setVariable("USER", "builder");
+    configure("user.name", "Ann");
+    configure("user.email", "");
+    expectFailure(emptyIdentity);
+}
+
+TEST_F(CommitIdentity, OfAConfiguredNameWithAngleBracketsIsRefused)
+{
+    setVariable("USER", "builder");
+    configure("user.name", "Ann <ann@example.com>");
+    configure("user.email", "ann@example.com");
+    expectFailure(angleBrackets);
+}
+
+TEST_F(CommitIdentity, OfAUserWithAngleBracketsIsRefused)
+{
+    setVariable("USER", "<builder>");
+    expectFailure(angleBrackets);
+}
+
+/// The name of the address is as it was; libgit2 cuts what it takes for noise at the ends.
+TEST_F(CommitIdentity, IsOnlyCleanedUpByLibGit2)
+{
+    setVariable("USER", " the builder" + noise + " ");
+    EXPECT_EQ(identityAfterCommit(), "the builder <the builder" + noise + " @" + hostName() + ">");
+}
+
+TEST_F(CommitIdentity, KeepsTheBytesOfAName)
+{
+    setVariable("USER", "J\xC3\xBCrg");
+    EXPECT_EQ(identityAfterCommit(), "J\xC3\xBCrg <J\xC3\xBCrg@" + hostName() + ">");
+}
+
+TEST_F(CommitIdentity, FailsWithAConfigurationThatCannotBeRead)
+{
+    setVariable("USER", "builder");
+    const NothingChanges nothing(repository_);
+    const GitRepository home(environment().home());
+    home.write(".gitconfig", "[user\n");
+    const Failure failure = failureOf([this] { commit(); });
+    EXPECT_EQ(failure.code, GIT_ERROR);
+    EXPECT_EQ(failure.errorClass, GIT_ERROR_CONFIG);
+    home.remove(".gitconfig");
+}
+
+TEST_F(CommitIdentity, HasTheCurrentTimeInTheLocalZone)
+{
+    setVariable("USER", "builder");
+    for (const auto &[zone, offset] : {std::pair{"EAST-05:30", " +0530"}, {"WEST+08:00", " -0800"}})
+    {
+        const TimeZone local(zone);
+        const std::time_t before = std::time(nullptr);
+        commit();
+        const std::time_t after = std::time(nullptr);
+        for (const std::string kind : {"author", "committer"})
+        {
+            const std::string bytes = repository_.git({"cat-file", "commit", "HEAD"});
+            const std::string beginning = '\n' + kind + " builder <builder@" + hostName() + "> ";
+            const auto begin = bytes.find(beginning);
+            ASSERT_NE(begin, std::string::npos) << bytes;
+            const std::string when = bytes.substr(begin + beginning.size(), 16);
+            EXPECT_EQ(when.substr(10), offset);
+            EXPECT_GE(std::stoll(when), before);
+            EXPECT_LE(std::stoll(when), after);
+        }
+    }
+}
+
+TEST_F(CommitIdentity, IsInTheReflogToo)
+{
+    setVariable("USER", "builder");
+    commit();
+    EXPECT_EQ(repository_.line({"log", "--walk-reflogs", "-1", "--format=%gn <%ge>"}),
+              "builder <builder@" + hostName() + ">");
+}
+
+} // namespace

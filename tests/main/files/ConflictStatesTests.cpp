@@ -1,0 +1,116 @@
+// SPDX-License-Identifier: MIT
+#include <optional>
+#include <string>
+
+#include <gtest/gtest.h>
+
+#include "main/AdapterFixture.hpp"
+
+namespace
+{
+
+using vclink::test::States;
+
+/// A merge of two branches that changed one file each in its way.
+class ConflictStates : public vclink::test::AdapterFixture
+{
+  protected:
+    using Content = std::optional<std::string>;
+
+    void commit(const Content &content)
+    {
+        if (content)
+            repository_.write("file", *content);
+        else
+            repository_.remove("file");
+        repository_.commitAll("change");
+    }
+
+    /// @return git's two letters for the file
+    std::string merge(const Content &base, const Content &ours, const Content &theirs)
+    {
+        repository_.write("bystander", "x");
+        repository_.commitAll("beginning");
+        if (base)
+            commit(base);
+        repository_.git({"branch", "other"});
+        commit(ours);
+        repository_.git({"checkout", "--quiet", "other"});
+        commit(theirs);
+        repository_.git({"checkout", "--quiet", "main"});
+        repository_.tryGit(
+            {"-c", "user.name=T", "-c", "user.email=t@example.com", "merge", "--quiet", "other"});
+        return repository_.git({"status", "--porcelain", "file"}).substr(0, 2);
+    }
+
+    void expectConflict() const
+    {
+        const States expected{{"bystander", "Clean"}, {"file", "InConflict"}};
+        EXPECT_EQ(allStates(repository_), expected);
+        EXPECT_EQ(states(repository_, {"file"}), (States{{"file", "InConflict"}}));
+    }
+
+    vclink::test::GitRepository repository_ = makeRepository();
+};
+
+TEST_F(ConflictStates, OfAFileThatBothChanged)
+{
+    ASSERT_EQ(merge("base\n", "ours\n", "theirs\n"), "UU");
+    expectConflict();
+}
+
+TEST_F(ConflictStates, OfAFileThatBothAdded)
+{
+    ASSERT_EQ(merge({}, "ours\n", "theirs\n"), "AA");
+    expectConflict();
+}
+
+TEST_F(ConflictStates, OfAFileThatTheyDeleted)
+{
+    ASSERT_EQ(merge("base\n", "ours\n", {}), "UD");
+    expectConflict();
+}
+
+TEST_F(ConflictStates, OfAFileThatWeDeleted)
+{
+    ASSERT_EQ(merge("base\n", {}, "theirs\n"), "DU");
+    expectConflict();
+}
+
+TEST_F(ConflictStates, StandsWhateverIsOnDisk)
+{
+    ASSERT_EQ(merge("base\n", "ours\n", "theirs\n"), "UU");
+    repository_.remove("file");
+    expectConflict();
+    repository_.write("file", "ours\n");
+    expectConflict();
+}
+
+TEST_F(ConflictStates, EndsWhenTheFileIsStaged)
+{
+    ASSERT_EQ(merge("base\n", "ours\n", "theirs\n"), "UU");
+    repository_.write("file", "merged\n");
+    repository_.add({"file"});
+    EXPECT_EQ(states(repository_, {"file"}), (States{{"file", "Modified"}}));
+}
+
+/// The three stages of a renaming on both sides, of which each path has one only.
+TEST_F(ConflictStates, OfAFileThatBothRenamed)
+{
+    repository_.write("file", std::string(1000, 'x') + "\n");
+    repository_.commitAll("base");
+    repository_.git({"branch", "other"});
+    repository_.git({"mv", "file", "ours"});
+    repository_.commit("ours");
+    repository_.git({"checkout", "--quiet", "other"});
+    repository_.git({"mv", "file", "theirs"});
+    repository_.commit("theirs");
+    repository_.git({"checkout", "--quiet", "main"});
+    repository_.tryGit(
+        {"-c", "user.name=T", "-c", "user.email=t@example.com", "merge", "--quiet", "other"});
+    ASSERT_EQ(repository_.git({"status", "--porcelain"}), "DD file\nAU ours\nUA theirs\n");
+    EXPECT_EQ(allStates(repository_),
+              (States{{"file", "InConflict"}, {"ours", "InConflict"}, {"theirs", "InConflict"}}));
+}
+
+} // namespace

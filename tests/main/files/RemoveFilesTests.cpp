@@ -1,0 +1,353 @@
+// SPDX-License-Identifier: MIT
+#include <filesystem>
+#include <functional>
+#include <string>
+#include <vector>
+
+#include <boost/filesystem/exception.hpp>
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include "StagingFixture.hpp"
+
+namespace
+{
+
+using shared_vclink::git::NoFilesToRemove;
+using testing::ElementsAre;
+using vclink::git::TagException;
+using vclink::test::asPath;
+using vclink::test::indexOf;
+using vclink::test::NothingChanges;
+using vclink::test::RepositoryState;
+using vclink::test::States;
+
+class RemoveFiles : public vclink::test::StagingFixture
+{
+  protected:
+    static void expectRefuses(const std::function<void()> &action)
+    {
+        try
+        {
+            action();
+            ADD_FAILURE() << "no exception";
+        }
+        catch (const TagException<NoFilesToRemove> &exception)
+        {
+            const vclink::exception::SourceControlException &base = exception;
+            EXPECT_EQ(typeid(base), typeid(TagException<NoFilesToRemove>));
+            EXPECT_EQ(exception.GetBaseMsgIDObj().getKey(), "NoFilesToRemove");
+            EXPECT_EQ(exception.GetBaseMsgIDObj().getCatalogue(), "shared_vclink:git");
+            EXPECT_TRUE(exception.GetBaseMsgIDObj().getArguments().empty());
+            EXPECT_EQ(vclink::test::asUtf8(exception.GetUnicodeMessageTxt()),
+                      "There are no files to remove. Nothing was changed.");
+        }
+    }
+
+    void expectRefuses(const std::vector<std::string> &names) const
+    {
+        expectRefuses([&] { remove(names); });
+    }
+};
+
+TEST_F(RemoveFiles, EndsTheTrackingOfAFileAndLeavesItOnDisk)
+{
+    remove({"file"});
+    EXPECT_THAT(status(), ElementsAre("D  file", "?? file"));
+    EXPECT_EQ(repository_.read("file"), "content of file\n");
+    EXPECT_EQ(states(repository_, {"file"}), (States{{"file", "Deleted"}}));
+}
+
+TEST_F(RemoveFiles, LeavesTheRepositoryAsGitWould)
+{
+    const RepositoryState expected = stateAfterGit({{"rm", "--cached", "file", "sub/inside"}});
+    remove({"sub/inside", "file"});
+    EXPECT_EQ(stateOf(repository_), expected);
+}
+
+TEST_F(RemoveFiles, DoesNotWriteTheFile)
+{
+    const auto before = vclink::test::stampOf(repository_ / "file");
+    remove({"file"});
+    EXPECT_EQ(vclink::test::stampOf(repository_ / "file"), before);
+}
+
+TEST_F(RemoveFiles, RefusesToRemoveAFileASecondTime)
+{
+    remove({"file"});
+    const NothingChanges nothing(repository_);
+    expectRefuses({"file"});
+}
+
+TEST_F(RemoveFiles, RefusesAnEmptyList)
+{
+    const NothingChanges nothing(repository_);
+    expectRefuses(std::vector<std::string>());
+}
+
+TEST_F(RemoveFiles, OpensNothingForAnEmptyList)
+{
+    const auto adapter = makeAdapter(folder() / "missing");
+    expectRefuses([&] { adapter->removeFiles({}); });
+}
+
+TEST_F(RemoveFiles, RefusesAListOfWhichNothingMatches)
+{
+    repository_.write(".git/info/exclude", "*.o\n");
+    repository_.write("a.o", "x");
+    const NothingChanges nothing(repository_);
+    expectRefuses({"missing", "file/below", "a.o", "../outside"});
+}
+
+TEST_F(RemoveFiles, RefusesAListOfDeletedFiles)
+{
+    repository_.git({"rm", "--quiet", "file"});
+    repository_.git({"rm", "--quiet", "--cached", "other"});
+    const NothingChanges nothing(repository_);
+    expectRefuses({"other", "file"});
+}
+
+TEST_F(RemoveFiles, PassesOverADeletedFileWithoutAWord)
+{
+    repository_.git({"rm", "--quiet", "--cached", "other"});
+    remove({"other", "file"});
+    EXPECT_THAT(status(), ElementsAre("D  file", "D  other", "?? file", "?? other"));
+}
+
+TEST_F(RemoveFiles, LeavesAnUnversionedFileAsItIs)
+{
+    repository_.write("new", "x");
+    const RepositoryState before = stateOf(repository_);
+    EXPECT_NO_THROW(remove({"new"}));
+    EXPECT_EQ(stateOf(repository_), before);
+    EXPECT_EQ(states(repository_, {"new"}), (States{{"new", "Unversioned"}}));
+}
+
+TEST_F(RemoveFiles, RemovesTheOthersBesideAnUnversionedFile)
+{
+    repository_.write("new", "x");
+    remove({"new", "file"});
+    EXPECT_THAT(status(), ElementsAre("D  file", "?? file", "?? new"));
+}
+
+TEST_F(RemoveFiles, RemovesAFileInAnyStateButDeleted)
+{
+    repository_.write("gone", "x");
+    repository_.write("staged", "x");
+    repository_.commitAll("second");
+    repository_.write("file", "edited");
+    repository_.write("staged", "edited");
+    repository_.write("added", "x");
+    repository_.add({"added", "staged"});
+    repository_.write("intended", "x");
+    repository_.git({"add", "--intent-to-add", "intended"});
+    repository_.remove("gone");
+    repository_.remove("sub/inside");
+    repository_.symlink("nowhere", "sub/inside");
+    const std::vector<std::string> names{"added", "file",   "gone",      "intended",
+                                         "other", "staged", "sub/inside"};
+    EXPECT_EQ(states(repository_, names), (States{{"added", "Added"},
+                                                  {"file", "Modified"},
+                                                  {"gone", "Missing"},
+                                                  {"intended", "Added"},
+                                                  {"other", "Clean"},
+                                                  {"staged", "Modified"},
+                                                  {"sub/inside", "Unknown"}}));
+    const RepositoryState before = stateOf(repository_);
+    remove(names);
+    EXPECT_TRUE(indexOf(repository_).empty());
+    EXPECT_EQ(vclink::test::workingTreeOf(repository_), before.workingTree);
+}
+
+TEST_F(RemoveFiles, MakesAnAddedFileUnversionedAgain)
+{
+    repository_.write("new", "x");
+    repository_.add({"new"});
+    remove({"new"});
+    EXPECT_EQ(states(repository_, {"new"}), (States{{"new", "Unversioned"}}));
+    EXPECT_EQ(repository_.read("new"), "x");
+}
+
+TEST_F(RemoveFiles, TakesAFileInConflictOutOfTheIndex)
+{
+    beginMerge({"conflicted", "left"});
+    const RepositoryState expected = stateAfterGit({{"rm", "--cached", "conflicted"}});
+    remove({"conflicted"});
+    EXPECT_EQ(stateOf(repository_), expected);
+}
+
+TEST_F(RemoveFiles, RemovesATrackedFileThatIsIgnoredToo)
+{
+    repository_.write(".git/info/exclude", "file\n");
+    const RepositoryState expected = stateAfterGit({{"rm", "--cached", "file"}});
+    remove({"file"});
+    EXPECT_EQ(stateOf(repository_), expected);
+}
+
+TEST_F(RemoveFiles, WorksInARepositoryWithoutACommit)
+{
+    const auto empty = makeRepository("empty");
+    empty.write("new", "x");
+    empty.add({"new"});
+    makeAdapter(empty.path())->removeFiles({asPath(empty / "new")});
+    EXPECT_EQ(empty.git({"status", "--porcelain"}), "?? new\n");
+}
+
+TEST_F(RemoveFiles, TakesAnEmptyPathAndTheRootForNothing)
+{
+    const auto adapter = makeAdapter(repository_.path());
+    {
+        const NothingChanges nothing(repository_);
+        expectRefuses([&] { adapter->removeFiles({upath()}); });
+        expectRefuses([&] { adapter->removeFiles({asPath(repository_.path())}); });
+        expectRefuses([&] { adapter->removeFiles({asPath("missing"), asPath("/")}); });
+    }
+    adapter->removeFiles({upath(), asPath(repository_ / "file"), asPath(repository_.path())});
+    EXPECT_THAT(status(), ElementsAre("D  file", "?? file"));
+}
+
+TEST_F(RemoveFiles, TakesAFolderForAllBelowIt)
+{
+    repository_.write("sub/deep/#b", "x");
+    repository_.write("subway", "x");
+    repository_.commitAll("second");
+    repository_.write("sub/new", "x");
+    const RepositoryState expected = stateAfterGit({{"rm", "-r", "--cached", "sub"}});
+    remove({"sub"});
+    EXPECT_EQ(stateOf(repository_), expected);
+    EXPECT_EQ(expected.index.count("subway"), 1U);
+}
+
+TEST_F(RemoveFiles, TakesAFolderThatIsGoneForAllThatWasBelowIt)
+{
+    repository_.remove("sub");
+    remove({"sub"});
+    EXPECT_THAT(status(), ElementsAre("D  sub/inside"));
+}
+
+TEST_F(RemoveFiles, TakesAFolderWithADangerousNameForItsOwnEntry)
+{
+    for (const auto *name : {"#dir/a", "!dir/a", "dir /a"})
+        repository_.write(name, "x");
+    repository_.commitAll("second");
+    const NothingChanges nothing(repository_);
+    expectRefuses({"#dir", "!dir", "dir "});
+}
+
+TEST_F(RemoveFiles, RemovesTheOneFileThatLooksLikeAComment)
+{
+    repository_.write("#notes#", "x");
+    repository_.commitAll("second");
+    const RepositoryState expected = stateAfterGit({{"rm", "--cached", "#notes#"}});
+    remove({"#notes#"});
+    EXPECT_EQ(stateOf(repository_), expected);
+    EXPECT_EQ(expected.index.size(), 3U);
+}
+
+TEST_F(RemoveFiles, RemovesTheTwoFilesOfAListThatBeginDangerously)
+{
+    for (const auto *name : {"#a", "!b", "a", "b"})
+        repository_.write(name, "x");
+    repository_.commitAll("second");
+    const RepositoryState expected = stateAfterGit({{"rm", "--cached", "#a", "!b"}});
+    remove({"#a", "!b"});
+    EXPECT_EQ(stateOf(repository_), expected);
+    EXPECT_EQ(expected.index.count("a") + expected.index.count("b"), 2U);
+}
+
+TEST_F(RemoveFiles, TakesALinkForItsTarget)
+{
+    repository_.symlink("file", "link");
+    repository_.commitAll("second");
+    remove({"link"});
+    EXPECT_THAT(status(), ElementsAre("D  file", "?? file"));
+}
+
+/// The files that the folder stands for are looked up by name once more.
+TEST_F(RemoveFiles, TakesALinkAmongTheFilesOfAFolderForItsTarget)
+{
+    repository_.symlink("../file", "sub/link");
+    repository_.commitAll("second");
+    remove({"sub"});
+    EXPECT_THAT(status(), ElementsAre("D  file", "D  sub/inside", "?? file", "?? sub/inside"));
+}
+
+TEST_F(RemoveFiles, TakesALinkThatLeadsNowhereForItself)
+{
+    repository_.symlink("nowhere", "link");
+    repository_.commitAll("second");
+    remove({"link"});
+    EXPECT_THAT(status(), ElementsAre("D  link", "?? link"));
+    EXPECT_EQ(std::filesystem::read_symlink(repository_ / "link"), "nowhere");
+}
+
+TEST_F(RemoveFiles, RaisesOnALoopOfLinks)
+{
+    repository_.symlink("loop", "loop");
+    const NothingChanges nothing(repository_);
+    EXPECT_THROW(remove({"file", "loop"}), boost::filesystem::filesystem_error);
+}
+
+TEST_F(RemoveFiles, TakesTheFileWhereAFolderStandsNow)
+{
+    repository_.remove("file");
+    repository_.write("file/inside", "x");
+    remove({"file"});
+    EXPECT_THAT(status(), ElementsAre("D  file", "?? file/inside"));
+}
+
+TEST_F(RemoveFiles, TakesTheFilesOfAFolderWhereAFileStandsNow)
+{
+    repository_.remove("sub");
+    repository_.write("sub", "x");
+    remove({"sub"});
+    EXPECT_THAT(status(), ElementsAre("D  sub/inside", "?? sub"));
+}
+
+TEST_F(RemoveFiles, RemovesASubmoduleAndLeavesItsFiles)
+{
+    auto inner = makeRepository("inner");
+    inner.write("file", "x");
+    inner.commitAll("first");
+    repository_.git({"submodule", "--quiet", "add", inner.path().string(), "module"});
+    repository_.commit("second");
+    const RepositoryState expected = stateAfterGit({{"rm", "--cached", "module"}});
+    remove({"module"});
+    EXPECT_EQ(indexOf(repository_), expected.index);
+    EXPECT_EQ(repository_.read("module/file"), "x");
+}
+
+/// Of a renaming that is asked for as a whole only the old path is told, which the index has lost.
+TEST_F(RemoveFiles, DoesNothingForBothPathsOfAStagedRenaming)
+{
+    repository_.git({"mv", "file", "renamed"});
+    const RepositoryState before = stateOf(repository_);
+    EXPECT_NO_THROW(remove({"file", "renamed"}));
+    EXPECT_EQ(stateOf(repository_), before);
+    remove({"renamed"});
+    EXPECT_THAT(status(), ElementsAre("D  file", "?? renamed"));
+}
+
+TEST_F(RemoveFiles, LeavesAllOtherEntriesAsTheyAre)
+{
+    beginMerge({"conflicted"});
+    repository_.git({"update-index", "--skip-worktree", "other"});
+    repository_.git({"update-index", "--assume-unchanged", "sub/inside"});
+    repository_.remove("other");
+    repository_.write("edited", "x");
+    repository_.add({"edited"});
+    repository_.write("edited", "edited since");
+    const RepositoryState expected = stateAfterGit({{"rm", "--cached", "file"}});
+    remove({"file"});
+    EXPECT_EQ(stateOf(repository_), expected);
+}
+
+TEST_F(RemoveFiles, RefusesEverythingInABareRepository)
+{
+    const std::string bare = folder() / "bare";
+    repository_.git({"clone", "--quiet", "--bare", repository_.path().string(), bare});
+    const auto adapter = makeAdapter(bare);
+    expectRefuses([&] { adapter->removeFiles({asPath(bare + "/file")}); });
+}
+
+} // namespace

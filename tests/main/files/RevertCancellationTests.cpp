@@ -1,0 +1,363 @@
+// SPDX-License-Identifier: MIT
+#include <cstddef>
+#include <functional>
+#include <future>
+#include <memory>
+#include <string>
+#include <thread>
+#include <typeinfo>
+#include <vector>
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include "error/errorUtil/callbackException.hpp"
+#include "error/logging/severity.hpp"
+#include "error/raise.hpp"
+#include "main/AdapterFixture.hpp"
+#include "support/LogCapture.hpp"
+#include "support/RepositoryState.hpp"
+#include "support/text.hpp"
+#include "vclink/PollableTerminator.hpp"
+#include "vclink/git/messageIdentifiers.hpp"
+#include "vclink/util/exception/CancelledOperationException.hpp"
+
+namespace
+{
+
+namespace git = vclink::git;
+using testing::IsEmpty;
+using testing::SizeIs;
+using vclink::test::LogCapture;
+using vclink::test::LogRecord;
+using vclink::test::RepositoryState;
+using vclink::test::stateOf;
+using vclink::util::exception::CancelledOperationException;
+
+constexpr int fileCount = 300;
+
+/// Whether a set's poller, its last part, has a request; takes it.
+template <class Set> bool pollSees(Set &set)
+{
+    auto *const poller = reinterpret_cast<vclink::PollableTerminator *>(
+        reinterpret_cast<char *>(&set) + sizeof(Set) - sizeof(vclink::PollableTerminator));
+    return poller->checkAndResetCancelledState();
+}
+
+/// A repository of many files, all of them changed, the first half staged.
+class RevertCancellation : public vclink::test::AdapterFixture
+{
+  protected:
+    RevertCancellation()
+    {
+        git::pendingCallbackException() = nullptr;
+        for (int i = 0; i < fileCount; ++i)
+            names_.push_back("folder" + std::to_string(i % 7) + "/file" + std::to_string(i));
+        for (const auto &name : names_)
+            repository_.write(name, "committed\n");
+        repository_.commitAll("first");
+        reverted_ = stateOf(repository_);
+        changeAll();
+    }
+    ~RevertCancellation() override
+    {
+        git::pendingCallbackException() = nullptr;
+    }
+
+    void changeAll()
+    {
+        for (const auto &name : names_)
+            repository_.write(name, "changed, and longer\n");
+        const auto half = names_.begin() + fileCount / 2;
+        repository_.add({names_.begin(), half});
+        changed_ = stateOf(repository_);
+    }
+    void revertAll() const
+    {
+        const std::string root = repository_.path().string() + '/';
+        std::vector<upath> files;
+        for (const auto &name : names_)
+            files.push_back(vclink::test::asPath(root + name));
+        adapter_->revertFiles(files);
+    }
+
+    void expectCancelled() const
+    {
+        try
+        {
+            revertAll();
+            ADD_FAILURE() << "nothing was raised";
+        }
+        catch (const std::exception &exception)
+        {
+            EXPECT_EQ(typeid(exception), typeid(CancelledOperationException));
+        }
+        EXPECT_EQ(git::pendingCallbackException(), nullptr);
+    }
+    /// Nothing is broken, and nothing is in the way of the next operation.
+    void expectUsable() const
+    {
+        const auto check = repository_.tryGit({"fsck", "--strict", "--no-dangling"});
+        EXPECT_TRUE(check.succeeded()) << check.errors;
+        EXPECT_TRUE(repository_.tryGit({"status", "--porcelain"}).succeeded());
+        EXPECT_THAT(stateOf(repository_).underWay, IsEmpty()) << "a lock was left";
+    }
+    void expectReverted() const
+    {
+        EXPECT_EQ(stateOf(repository_), reverted_);
+    }
+    /// Expects the index as in HEAD, which comes before the checkout, and no file written.
+    void expectUnstagedOnly() const
+    {
+        const RepositoryState state = stateOf(repository_);
+        EXPECT_EQ(state.index, reverted_.index);
+        EXPECT_EQ(state.workingTree, changed_.workingTree);
+        EXPECT_EQ(state.head, changed_.head);
+    }
+
+    /// Asks for cancellation in the notification of this number, 1 being the first.
+    static void onNotification(LogCapture &log, int number, const std::function<void()> &action)
+    {
+        log.onRecord(
+            [number, action, count = 0](const LogRecord &record) mutable
+            {
+                if (isNotification(record.message) && ++count == number)
+                    action();
+            });
+    }
+    static bool isNotification(const std::string &text)
+    {
+        return text.rfind("Checkout Notify : ", 0) == 0;
+    }
+    static std::vector<std::string> notifications(const LogCapture &log)
+    {
+        std::vector<std::string> texts;
+        for (const auto &text : log.messages(git::SeverityProgress))
+        {
+            if (isNotification(text))
+                texts.push_back(text);
+        }
+        return texts;
+    }
+
+    std::vector<std::string> names_;
+    vclink::test::GitRepository repository_ = makeRepository();
+    RepositoryState reverted_;
+    RepositoryState changed_;
+    const std::unique_ptr<git::GitAdapter> adapter_ = makeAdapter(repository_.path());
+};
+
+TEST_F(RevertCancellation, AskedForBeforeTheStartStopsAtTheFirstNotification)
+{
+    interactor_->cancel();
+    const LogCapture log(git::SeverityProgress);
+    expectCancelled();
+    EXPECT_THAT(notifications(log), IsEmpty());
+    EXPECT_THAT(interactor_->progress.calls, IsEmpty());
+    expectUnstagedOnly();
+    expectUsable();
+}
+
+TEST_F(RevertCancellation, IsForgottenByTheRetry)
+{
+    interactor_->cancel();
+    expectCancelled();
+    EXPECT_NO_THROW(revertAll());
+    expectReverted();
+    expectUsable();
+}
+
+TEST_F(RevertCancellation, AskedForTwiceStopsOnce)
+{
+    interactor_->cancel();
+    interactor_->cancel();
+    expectCancelled();
+    EXPECT_NO_THROW(revertAll());
+    expectReverted();
+}
+
+TEST_F(RevertCancellation, AskedForAmongTheNotificationsStopsAtTheNext)
+{
+    LogCapture log(git::SeverityProgress);
+    onNotification(log, 100, [this] { interactor_->cancel(); });
+    expectCancelled();
+    EXPECT_THAT(notifications(log), SizeIs(100));
+    EXPECT_THAT(interactor_->progress.calls, IsEmpty());
+    expectUnstagedOnly();
+    expectUsable();
+
+    EXPECT_NO_THROW(revertAll());
+    expectReverted();
+    expectUsable();
+}
+
+TEST_F(RevertCancellation, PutsBackTheLinksThatWereInTheWay)
+{
+    repository_.write("../outside/precious", "x");
+    for (const auto *name : {"folder0", "folder1"})
+    {
+        repository_.remove(name);
+        repository_.symlink("../outside", name);
+    }
+    changed_ = stateOf(repository_);
+    LogCapture log(git::SeverityProgress);
+    onNotification(log, 200, [this] { interactor_->cancel(); });
+    const upath everything = vclink::test::asPath(repository_.path() / "*");
+    EXPECT_THROW(adapter_->revertFiles({everything}), CancelledOperationException);
+    expectUnstagedOnly();
+    expectUsable();
+
+    adapter_->revertFiles({everything});
+    expectReverted();
+    EXPECT_EQ(repository_.read("../outside/precious"), "x");
+}
+
+TEST_F(RevertCancellation, AskedForOnAnotherThreadStopsTheCheckout)
+{
+    std::promise<void> reached;
+    std::promise<void> asked;
+    std::thread person(
+        [&]
+        {
+            reached.get_future().wait();
+            interactor_->cancel();
+            asked.set_value();
+        });
+    LogCapture log(git::SeverityProgress);
+    onNotification(log, 100,
+                   [&]
+                   {
+                       reached.set_value();
+                       asked.get_future().wait();
+                   });
+    expectCancelled();
+    person.join();
+    EXPECT_THAT(notifications(log), SizeIs(100));
+    expectUnstagedOnly();
+    expectUsable();
+
+    EXPECT_NO_THROW(revertAll());
+    expectReverted();
+}
+
+// libgit2 notifies of all files before it writes the first.
+TEST_F(RevertCancellation, AskedForDuringTheFirstFileStopsTheNextCheckoutOnly)
+{
+    interactor_->progress.onCall = [this](std::size_t number)
+    {
+        if (number == 3)
+            interactor_->cancel();
+    };
+    EXPECT_NO_THROW(revertAll());
+    EXPECT_THAT(interactor_->progress.calls, SizeIs(2 * fileCount + 1));
+    expectReverted();
+
+    changeAll();
+    const LogCapture log(git::SeverityProgress);
+    expectCancelled();
+    EXPECT_THAT(notifications(log), IsEmpty());
+    expectUnstagedOnly();
+    expectUsable();
+
+    EXPECT_NO_THROW(revertAll());
+    expectReverted();
+}
+
+TEST_F(RevertCancellation, AskedForAfterTheLastFileStopsTheNextCheckoutOnly)
+{
+    interactor_->progress.onCall = [this](std::size_t number)
+    {
+        if (number == 2 * fileCount + 1)
+            interactor_->cancel();
+    };
+    EXPECT_NO_THROW(revertAll());
+    expectReverted();
+    expectUsable();
+
+    changeAll();
+    const LogCapture log(git::SeverityProgress);
+    expectCancelled();
+    EXPECT_THAT(notifications(log), IsEmpty());
+    expectUnstagedOnly();
+
+    EXPECT_NO_THROW(revertAll());
+    expectReverted();
+}
+
+TEST_F(RevertCancellation, IsNotSeenByACheckoutThatNotifiesOfNothing)
+{
+    revertAll();
+    interactor_->cancel();
+    EXPECT_NO_THROW(revertAll());
+    changeAll();
+    expectCancelled();
+    EXPECT_NO_THROW(revertAll());
+    expectReverted();
+}
+
+TEST_F(RevertCancellation, DoesNotStopTheOtherOperations)
+{
+    interactor_->cancel();
+    const std::string root = repository_.path().string();
+    EXPECT_THAT(adapter_->getFolderStates(vclink::test::asPath(root)), SizeIs(fileCount));
+    EXPECT_NO_THROW(adapter_->markResolved(vclink::test::asPath(root + '/' + names_.back())));
+    expectCancelled();
+}
+
+TEST_F(RevertCancellation, IsStillThereAfterARevertThatIsRefused)
+{
+    const std::string id = repository_.line({"rev-parse", "HEAD:" + names_.front()});
+    repository_.command({"update-index", "--index-info"})
+        .input("0 " + std::string(40, '0') + '\t' + names_.front() + "\n100644 " + id + " 2\t" +
+               names_.front() + '\n')
+        .run();
+    interactor_->cancel();
+    EXPECT_THROW(revertAll(), git::TagException<shared_vclink::git::Conflicted>);
+    repository_.git({"read-tree", "HEAD"});
+    expectCancelled();
+}
+
+TEST_F(RevertCancellation, IsRememberedForCheckoutsAndRemotesSeparately)
+{
+    interactor_->cancel();
+    EXPECT_TRUE(pollSees(adapter_->getCallbacks().remoteCallbacks()));
+    expectCancelled();
+    EXPECT_NO_THROW(revertAll());
+
+    changeAll();
+    interactor_->cancel();
+    expectCancelled();
+    EXPECT_TRUE(pollSees(adapter_->getCallbacks().remoteCallbacks()));
+    EXPECT_FALSE(pollSees(adapter_->getCallbacks().remoteCallbacks()));
+}
+
+TEST_F(RevertCancellation, IsSeenByEachAdapterOfTheInteractor)
+{
+    const auto other = makeAdapter(repository_.path());
+    interactor_->cancel();
+    expectCancelled();
+    EXPECT_THROW(other->revertFiles({vclink::test::asPath(repository_.path() / names_.front())}),
+                 CancelledOperationException);
+    EXPECT_NO_THROW(revertAll());
+}
+
+TEST_F(RevertCancellation, AskedForBeforeTheAdapterWasMadeIsNotItsAffair)
+{
+    interactor_->cancel();
+    EXPECT_NO_THROW(makeAdapter(repository_.path())
+                        ->revertFiles({vclink::test::asPath(repository_.path() / names_.front())}));
+}
+
+TEST_F(RevertCancellation, IsInTheLog)
+{
+    interactor_->cancel();
+    const LogCapture log(git::SeverityException | git::SeverityDiagnostic);
+    expectCancelled();
+    const auto messages = log.messages();
+    ASSERT_THAT(messages, SizeIs(2));
+    EXPECT_THAT(messages[0], testing::StartsWith("Exception caught: "));
+    EXPECT_THAT(messages[0], testing::HasSubstr("CancelledOperationException"));
+    EXPECT_EQ(messages[1], "Re-throwing error from callback");
+}
+
+} // namespace

@@ -1,0 +1,223 @@
+// SPDX-License-Identifier: MIT
+#include <string>
+
+#include <git2.h>
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include "StagingFixture.hpp"
+
+namespace
+{
+
+using testing::ElementsAre;
+using vclink::test::asPath;
+using vclink::test::Failure;
+using vclink::test::failureOf;
+using vclink::test::indexOf;
+using vclink::test::NothingChanges;
+using vclink::test::printed;
+using vclink::test::RepositoryState;
+using vclink::test::stampOf;
+using vclink::test::workingTreeOf;
+
+/// What a failure of a revert leaves behind: everything, or what the reset of the index made.
+class RevertFailure : public vclink::test::StagingFixture
+{
+  protected:
+    RevertFailure()
+    {
+        repository_.write("file", "staged\n");
+        repository_.add({"file"});
+        repository_.write("file", "edited\n");
+        repository_.write("other", "edited\n");
+        repository_.write("sub/inside", "staged\n");
+        repository_.add({"sub/inside"});
+    }
+
+    RepositoryState::Entries committedIndex() const
+    {
+        return stateAfterGit({{"restore", "--staged", "."}}).index;
+    }
+    std::string path(const std::string &name) const
+    {
+        return repository_ / name;
+    }
+};
+
+TEST_F(RevertFailure, OfALockedIndexChangesNothing)
+{
+    repository_.write(".git/index.lock", "another process");
+    const NothingChanges nothing(repository_);
+    EXPECT_EQ(failureOf(
+                  [this] {
+                      revert({"file", "other"});
+                  }),
+              (Failure{GIT_ELOCKED, GIT_ERROR_INDEX,
+                       "the index is locked by '" + path(".git/index.lock") +
+                           "'; this might be due to a concurrent or crashed process"}));
+}
+
+TEST_F(RevertFailure, OfAFolderOfGitThatCannotBeWrittenChangesNothing)
+{
+    giveAway();
+    repository_.setMode(".git", 0555);
+    {
+        const NothingChanges nothing(repository_);
+        EXPECT_EQ(unprivilegedFailureOf(
+                      [this] {
+                          revert({"file", "other"});
+                      }),
+                  printed({GIT_ERROR, GIT_ERROR_OS,
+                           "failed to create locked file '" + path(".git/index.lock") +
+                               "': Permission denied"}));
+    }
+    repository_.setMode(".git", 0755);
+}
+
+TEST_F(RevertFailure, OfARootThatCannotBeOpenedIsRaised)
+{
+    const auto missing = makeAdapter(folder() / "missing");
+    EXPECT_EQ(failureOf([&] { missing->revertFiles({asPath(folder() / "missing/file")}); }).code,
+              GIT_ENOTFOUND);
+}
+
+TEST_F(RevertFailure, OfABrokenIndexChangesNothing)
+{
+    repository_.write(".git/index",
+                      "this is no index, and long enough to be told from an empty one");
+    const auto index = stampOf(path(".git/index"));
+    const auto tree = workingTreeOf(repository_);
+    EXPECT_EQ(failureOf([this] { revert({"file"}); }),
+              (Failure{GIT_ERROR, GIT_ERROR_INDEX,
+                       "invalid data in index - incorrect header signature"}));
+    EXPECT_EQ(stampOf(path(".git/index")), index);
+    EXPECT_EQ(workingTreeOf(repository_), tree);
+}
+
+TEST_F(RevertFailure, OfABareRepositoryIsRaised)
+{
+    const std::string bare = folder() / "bare";
+    repository_.git({"clone", "--quiet", "--bare", repository_.path().string(), bare});
+    const auto adapter = makeAdapter(bare);
+    EXPECT_EQ(
+        failureOf([&] { adapter->revertFiles({asPath(bare + "/file")}); }),
+        (Failure{GIT_EBAREREPO, GIT_ERROR_REPOSITORY,
+                 "cannot checkout. This operation is not allowed against bare repositories."}));
+}
+
+/// The file is out of the index, as where there is no commit, and on disk as it was. In a process
+/// of its own, because libgit2 loses memory over a reference like this one.
+TEST_F(RevertFailure, OfAHeadThatCannotBeReadLeavesTheResetInPlace)
+{
+    repository_.write(".git/refs/heads/main", std::string(40, '1') + "\n");
+    giveAway();
+    RepositoryState expected = stateOf(repository_);
+    expected.index.erase("file");
+    EXPECT_EQ(unprivilegedFailureOf([this] { revert({"file"}); }),
+              printed({GIT_ENOTFOUND, GIT_ERROR_INVALID,
+                       "the reference 'refs/heads/main' cannot be peeled - Cannot retrieve "
+                       "reference target"}));
+    EXPECT_EQ(stateOf(repository_), expected);
+}
+
+TEST_F(RevertFailure, OfACheckoutLeavesTheResetInPlace)
+{
+    repository_.remove("sub/inside");
+    giveAway();
+    repository_.setMode("sub", 0555);
+    RepositoryState expected = stateOf(repository_);
+    expected.index = committedIndex();
+    EXPECT_EQ(
+        unprivilegedFailureOf([this] { revert({"sub/inside"}); }),
+        printed({GIT_ERROR, GIT_ERROR_OS,
+                 "could not open '" + path("sub/inside") + "' for writing: Permission denied"}));
+    expected.index["file"] = indexOf(repository_).at("file");
+    EXPECT_EQ(stateOf(repository_), expected);
+    repository_.setMode("sub", 0755);
+    EXPECT_THAT(status(), ElementsAre("MM file", " M other", " D sub/inside"));
+}
+
+/// What came before the failure is on disk.
+TEST_F(RevertFailure, OfACheckoutMayLeaveSomeFilesRestoredAndIsOverWhenItsCauseIsGone)
+{
+    repository_.remove("sub/inside");
+    giveAway();
+    repository_.setMode("sub", 0555);
+    RepositoryState expected = stateOf(repository_);
+    expected.index = committedIndex();
+    expected.workingTree["file"] = "644 content of file\n";
+    expected.workingTree["other"] = "644 content of other\n";
+    unprivilegedFailureOf([this] { revert({"sub/inside", "file", "other"}); });
+    EXPECT_EQ(stateOf(repository_), expected);
+    repository_.setMode("sub", 0755);
+    revert({"sub/inside", "file", "other"});
+    EXPECT_THAT(status(), ElementsAre());
+}
+
+/// An entry is not made for what is not there.
+TEST_F(RevertFailure, OfAContentThatTheResetMissesChangesNothing)
+{
+    const std::string id = repository_.line({"rev-parse", "HEAD:file"});
+    repository_.remove(".git/objects/" + id.substr(0, 2) + "/" + id.substr(2));
+    const NothingChanges nothing(repository_);
+    EXPECT_EQ(failureOf(
+                  [this] {
+                      revert({"file", "other"});
+                  }),
+              (Failure{GIT_ERROR, GIT_ERROR_ODB,
+                       "object not found - cannot read header for (" + id + ")"}));
+}
+
+TEST_F(RevertFailure, OfAContentThatTheCheckoutMissesLeavesTheFile)
+{
+    const std::string id = repository_.line({"rev-parse", "HEAD:other"});
+    repository_.remove(".git/objects/" + id.substr(0, 2) + "/" + id.substr(2));
+    RepositoryState expected = stateOf(repository_);
+    expected.index = committedIndex();
+    expected.index["sub/inside"] = indexOf(repository_).at("sub/inside");
+    EXPECT_EQ(
+        failureOf(
+            [this] {
+                revert({"file", "other"});
+            }),
+        (Failure{GIT_ENOTFOUND, GIT_ERROR_ODB, "object not found - no match for id (" + id + ")"}));
+    expected.workingTree = workingTreeOf(repository_);
+    EXPECT_EQ(stateOf(repository_), expected);
+    EXPECT_EQ(repository_.read("other"), "edited\n");
+}
+
+/// git would take the file away.
+TEST_F(RevertFailure, OfAFolderWhereAFileStandsNowLeavesTheFile)
+{
+    repository_.remove("sub");
+    repository_.write("sub", "precious");
+    RepositoryState expected = stateOf(repository_);
+    expected.index = committedIndex();
+    expected.index["file"] = indexOf(repository_).at("file");
+    EXPECT_EQ(failureOf([this] { revert({"sub/inside"}); }),
+              (Failure{GIT_ECONFLICT, GIT_ERROR_CHECKOUT,
+                       "the untracked file 'sub' is in the way of the checkout"}));
+    EXPECT_EQ(stateOf(repository_), expected);
+}
+
+/// The link would be written through.
+TEST_F(RevertFailure, OfALinkThatCannotBeRemovedWritesNothingThroughIt)
+{
+    repository_.write("../outside", "precious");
+    repository_.remove("sub/inside");
+    repository_.symlink("../../outside", "sub/inside");
+    giveAway();
+    repository_.setMode("sub", 0555);
+    RepositoryState expected = stateOf(repository_);
+    expected.index = committedIndex();
+    expected.index["file"] = indexOf(repository_).at("file");
+    EXPECT_EQ(unprivilegedFailureOf([this] { revert({"sub"}); }),
+              printed({GIT_ERROR, GIT_ERROR_OS,
+                       "could not remove '" + path("sub/inside") + "': Permission denied"}));
+    EXPECT_EQ(stateOf(repository_), expected);
+    EXPECT_EQ(repository_.read("../outside"), "precious");
+    repository_.setMode("sub", 0755);
+}
+
+} // namespace

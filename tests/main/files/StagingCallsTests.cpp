@@ -1,0 +1,291 @@
+// SPDX-License-Identifier: MIT
+#include <functional>
+#include <string>
+#include <vector>
+
+#include <git2.h>
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include "StagingFixture.hpp"
+#include "main/callNames.hpp"
+#include "support/libgit2/LibGit2Recorder.hpp"
+#include "util/path/pathspecEscape.hpp"
+
+namespace
+{
+
+using shared_vclink::git::AlreadyAdded;
+using shared_vclink::git::NoFilesToRemove;
+using testing::ElementsAre;
+using testing::IsEmpty;
+using vclink::git::TagException;
+using vclink::test::Failure;
+using vclink::test::failureOf;
+using vclink::test::LibGit2Recorder;
+using vclink::test::NothingChanges;
+using vclink::test::ofTheQuery;
+using vclink::test::operator+;
+using Names = std::vector<std::string>;
+
+const Names ofTheOpening{"git_repository_open_ext"};
+const Names ofTheLock = ofTheOpening + Names{"git_index_open", "git_repository_set_index",
+                                             "git_index_set_caps", "git_index_free"};
+const Names ofTheEnd{"git_index_free", "git_repository_free"};
+const Names ofTheAddition =
+    ofTheLock + Names{"git_repository_index", "git_index_add_all", "git_index_write"} + ofTheEnd;
+const Names ofTheRemoval =
+    ofTheLock + Names{"git_repository_index", "git_index_remove_all", "git_index_write"} + ofTheEnd;
+
+/// What an index call was given.
+struct AskedOfIndex
+{
+    Names pathspec;
+    unsigned flags = 99;
+    git_index_matched_path_cb callback = nullptr;
+    void *payload = nullptr;
+};
+
+/// The calls of libgit2 that staging makes.
+class StagingCalls : public vclink::test::StagingFixture
+{
+  protected:
+    StagingCalls()
+    {
+        repository_.write("new", "x");
+        calls_.clear();
+        calls_.on<git_index_add_all>(
+            [this](git_index *, const git_strarray *pathspec, unsigned flags,
+                   git_index_matched_path_cb callback, void *payload) {
+                additions_.push_back({textsOf(pathspec), flags, callback, payload});
+            });
+        calls_.on<git_index_remove_all>(
+            [this](git_index *, const git_strarray *pathspec, git_index_matched_path_cb callback,
+                   void *payload) {
+                removals_.push_back({textsOf(pathspec), 99, callback, payload});
+            });
+    }
+
+    static Names textsOf(const git_strarray *pathspec)
+    {
+        return {pathspec->strings, pathspec->strings + pathspec->count};
+    }
+    void add(const Names &names) const
+    {
+        adapter_->addFiles(files(names));
+    }
+    void remove(const Names &names) const
+    {
+        adapter_->removeFiles(files(names));
+    }
+    void markResolved(const std::string &name) const
+    {
+        adapter_->markResolved(files({name}).front());
+    }
+
+    std::unique_ptr<vclink::git::GitAdapter> adapter_ = makeAdapter(repository_.path());
+    LibGit2Recorder calls_;
+    std::vector<AskedOfIndex> additions_;
+    std::vector<AskedOfIndex> removals_;
+};
+
+TEST_F(StagingCalls, OfAnAdditionFollowThoseOfTheQuery)
+{
+    add({"new"});
+    EXPECT_EQ(calls_.steps(), ofTheQuery + ofTheAddition);
+    EXPECT_THAT(calls_.openHandles(), IsEmpty());
+}
+
+TEST_F(StagingCalls, OfARemovalFollowThoseOfTheQuery)
+{
+    remove({"file"});
+    EXPECT_EQ(calls_.steps(), ofTheQuery + ofTheRemoval);
+    EXPECT_THAT(calls_.openHandles(), IsEmpty());
+}
+
+TEST_F(StagingCalls, OfAFileMarkedAsResolvedAreThoseOfItsAdditionOrRemoval)
+{
+    markResolved("new");
+    EXPECT_EQ(calls_.steps(), ofTheAddition);
+    calls_.clear();
+    markResolved("missing");
+    EXPECT_EQ(calls_.steps(), ofTheRemoval);
+    EXPECT_THAT(calls_.openHandles(), IsEmpty());
+}
+
+TEST_F(StagingCalls, OpenTheRootItselfWithoutASearch)
+{
+    Names paths;
+    calls_.on<git_repository_open_ext>(
+        [&](git_repository **, const char *path, unsigned flags, const char *ceilings)
+        {
+            paths.emplace_back(path);
+            EXPECT_EQ(flags, static_cast<unsigned>(GIT_REPOSITORY_OPEN_NO_SEARCH));
+            EXPECT_EQ(ceilings, nullptr);
+        });
+    add({"new"});
+    markResolved("missing");
+    const std::string root = repository_.path();
+    EXPECT_THAT(paths, ElementsAre(root, root, root));
+}
+
+TEST_F(StagingCalls, OfAnAdditionHaveTheFilesAndNoFlag)
+{
+    repository_.write("#a", "x");
+    repository_.write("sub/new", "x");
+    add({"sub/new", "new", "#a", "missing"});
+    ASSERT_EQ(additions_.size(), 1U);
+    EXPECT_THAT(additions_[0].pathspec,
+                ElementsAre(vclink::git::escapePathspec("#a"), "new", "sub/new"));
+    EXPECT_EQ(additions_[0].flags, 0U);
+    EXPECT_EQ(additions_[0].flags, static_cast<unsigned>(GIT_INDEX_ADD_DEFAULT));
+    EXPECT_EQ(additions_[0].payload, adapter_.get());
+    EXPECT_THAT(removals_, IsEmpty());
+}
+
+TEST_F(StagingCalls, OfARemovalHaveTheFiles)
+{
+    remove({"sub/inside", "file", "new"});
+    ASSERT_EQ(removals_.size(), 1U);
+    EXPECT_THAT(removals_[0].pathspec, ElementsAre("file", "new", "sub/inside"));
+    EXPECT_EQ(removals_[0].payload, adapter_.get());
+    EXPECT_THAT(additions_, IsEmpty());
+}
+
+TEST_F(StagingCalls, OfAFileMarkedAsResolvedHaveThisFile)
+{
+    markResolved("file");
+    markResolved("gone");
+    ASSERT_EQ(additions_.size(), 1U);
+    ASSERT_EQ(removals_.size(), 1U);
+    EXPECT_THAT(additions_[0].pathspec, ElementsAre("file"));
+    EXPECT_EQ(additions_[0].flags, static_cast<unsigned>(GIT_INDEX_ADD_DEFAULT));
+    EXPECT_THAT(removals_[0].pathspec, ElementsAre("gone"));
+}
+
+/// The callback may be given anything, and reads nothing of it.
+TEST_F(StagingCalls, AcceptEveryPath)
+{
+    add({"new"});
+    remove({"file"});
+    for (const AskedOfIndex &asked : {additions_.at(0), removals_.at(0)})
+    {
+        ASSERT_NE(asked.callback, nullptr);
+        EXPECT_EQ(asked.callback("path", "pattern", asked.payload), 0);
+        EXPECT_EQ(asked.callback("", nullptr, nullptr), 0);
+        EXPECT_EQ(asked.callback(nullptr, nullptr, nullptr), 0);
+    }
+}
+
+TEST_F(StagingCalls, AreNoneForAnEmptyList)
+{
+    adapter_->addFiles({});
+    EXPECT_THROW(adapter_->removeFiles({}), TagException<NoFilesToRemove>);
+    EXPECT_THAT(calls_.steps(), IsEmpty());
+}
+
+TEST_F(StagingCalls, AreThoseOfTheQueryAloneWhereNothingIsLeftToDo)
+{
+    add({"missing"});
+    EXPECT_EQ(calls_.steps(), ofTheQuery);
+    calls_.clear();
+    EXPECT_THROW(remove({"missing"}), TagException<NoFilesToRemove>);
+    EXPECT_EQ(calls_.steps(), ofTheQuery);
+}
+
+TEST_F(StagingCalls, AreThoseOfTheQueryAloneWhereAFileIsRefused)
+{
+    EXPECT_THROW(add({"new", "file"}), TagException<AlreadyAdded>);
+    EXPECT_EQ(calls_.steps(), ofTheQuery);
+    EXPECT_THAT(calls_.openHandles(), IsEmpty());
+}
+
+/// One of the calls of staging that fail, and those that are made nevertheless.
+struct FailingIndexCall
+{
+    std::string name;
+    Names expected;
+    /// which of the calls by this name; 0 for each
+    std::size_t call = 0;
+};
+
+class FailingStagingCalls : public StagingCalls
+{
+  protected:
+    void expectFails(const FailingIndexCall &failing, const std::function<void()> &operation)
+    {
+        SCOPED_TRACE(failing.name);
+        calls_.clear();
+        calls_.fail({{failing.name, GIT_EAUTH, failing.call}});
+        const NothingChanges nothing(repository_);
+        EXPECT_EQ(failureOf(operation), (Failure{GIT_EAUTH, GIT_ERROR_OS, "injected"}));
+        EXPECT_EQ(calls_.steps(), failing.expected);
+        EXPECT_THAT(calls_.openHandles(), IsEmpty());
+    }
+};
+
+TEST_F(FailingStagingCalls, EndAnAdditionAndReleaseTheHandles)
+{
+    const Names index = ofTheLock + Names{"git_repository_index"};
+    const Names addAll = index + Names{"git_index_add_all"};
+    const std::vector<FailingIndexCall> failing{
+        {"git_repository_open_ext", ofTheOpening},
+        {"git_index_open", ofTheOpening + Names{"git_index_open", "git_repository_free"}},
+        {"git_repository_set_index",
+         ofTheOpening + Names{"git_index_open", "git_repository_set_index"} + ofTheEnd},
+        {"git_index_set_caps",
+         ofTheOpening + Names{"git_index_open", "git_repository_set_index", "git_index_set_caps"} +
+             ofTheEnd},
+        {"git_repository_index", index + Names{"git_repository_free"}},
+        {"git_index_add_all", addAll + ofTheEnd},
+        {"git_index_write", addAll + Names{"git_index_write"} + ofTheEnd}};
+    for (const auto &call : failing)
+        expectFails(call, [this] { markResolved("new"); });
+    for (auto call = failing.begin() + 1; call != failing.end(); ++call)
+    {
+        const FailingIndexCall afterTheQuery{call->name, ofTheQuery + call->expected};
+        expectFails(afterTheQuery, [this] { add({"new"}); });
+    }
+}
+
+TEST_F(FailingStagingCalls, EndARemovalAndReleaseTheHandles)
+{
+    const Names index = ofTheLock + Names{"git_repository_index"};
+    const Names removeAll = index + Names{"git_index_remove_all"};
+    const std::vector<FailingIndexCall> failing{
+        {"git_repository_open_ext", ofTheOpening},
+        {"git_index_open", ofTheOpening + Names{"git_index_open", "git_repository_free"}},
+        {"git_repository_set_index",
+         ofTheOpening + Names{"git_index_open", "git_repository_set_index"} + ofTheEnd},
+        {"git_index_set_caps",
+         ofTheOpening + Names{"git_index_open", "git_repository_set_index", "git_index_set_caps"} +
+             ofTheEnd},
+        {"git_repository_index", index + Names{"git_repository_free"}},
+        {"git_index_remove_all", removeAll + ofTheEnd},
+        {"git_index_write", removeAll + Names{"git_index_write"} + ofTheEnd}};
+    for (const auto &call : failing)
+        expectFails(call, [this] { markResolved("missing"); });
+    for (auto call = failing.begin() + 1; call != failing.end(); ++call)
+    {
+        const FailingIndexCall afterTheQuery{call->name, ofTheQuery + call->expected};
+        expectFails(afterTheQuery, [this] { remove({"file"}); });
+    }
+}
+
+TEST_F(FailingStagingCalls, OfTheSecondOpeningEndAnOperation)
+{
+    const FailingIndexCall second{"git_repository_open_ext",
+                                  ofTheQuery + Names{"git_repository_open_ext"}, 2};
+    expectFails(second, [this] { add({"new"}); });
+    expectFails(second, [this] { remove({"file"}); });
+}
+
+TEST_F(FailingStagingCalls, OfTheQueryEndAnOperationToo)
+{
+    const FailingIndexCall open{"git_repository_open_ext",
+                                {"git_status_options_init", "git_repository_open_ext"}};
+    expectFails(open, [this] { add({"new"}); });
+    expectFails(open, [this] { remove({"file"}); });
+}
+
+} // namespace

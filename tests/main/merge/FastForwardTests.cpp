@@ -1,0 +1,228 @@
+// SPDX-License-Identifier: MIT
+#include <memory>
+#include <stdexcept>
+#include <string>
+
+#include <git2.h>
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include "MergeFixture.hpp"
+#include "error/errorUtil/callbackException.hpp"
+#include "error/logging/severity.hpp"
+#include "main/TestOptionsFactory.hpp"
+#include "support/LogCapture.hpp"
+#include "support/cancelAt.hpp"
+#include "support/text.hpp"
+#include "vclink/util/exception/CancelledOperationException.hpp"
+
+namespace
+{
+
+namespace git = vclink::git;
+using testing::ElementsAre;
+using testing::HasSubstr;
+using testing::IsEmpty;
+using vclink::test::cancelAt;
+using vclink::test::Failure;
+using vclink::test::LogCapture;
+using vclink::test::NothingChanges;
+using vclink::test::ProgressCall;
+using vclink::test::stateOf;
+using vclink::test::textOf;
+using vclink::util::exception::CancelledOperationException;
+
+/// "topic" is ahead of main: it changes "file", drops "other" and has "folder/new".
+class FastForward : public vclink::test::MergeFixture
+{
+  protected:
+    FastForward()
+    {
+        makeBranch("topic",
+                   [this]
+                   {
+                       repository_.write("file", "of topic\n");
+                       repository_.remove("other");
+                       repository_.write("folder/new", "x");
+                       repository_.write("same", "x");
+                   });
+        // What neither side changes.
+        repository_.git({"checkout", "--quiet", "main"});
+    }
+
+    void expectRefused(const Failure &failure) const
+    {
+        const NothingChanges nothing(repository_);
+        EXPECT_EQ(failureOfMerge("topic"), textOf(failure));
+    }
+    static std::string cancellation()
+    {
+        return CancelledOperationException().what();
+    }
+};
+
+const Failure oneFileInTheWay{GIT_ECONFLICT, GIT_ERROR_CHECKOUT, "1 conflict prevents checkout"};
+
+TEST_F(FastForward, MovesTheBranchTheIndexAndTheFilesAndMakesNoCommit)
+{
+    const std::string objects = repository_.git({"count-objects"});
+    const std::string target = idOf("topic");
+    expectAsGit();
+    EXPECT_EQ(idOf("main"), target);
+    EXPECT_EQ(currentBranch(), "refs/heads/main");
+    EXPECT_EQ(repository_.git({"count-objects"}), objects);
+    EXPECT_THAT(status(), IsEmpty());
+    EXPECT_EQ(branches().getRepositoryState(), "Normal");
+    EXPECT_THAT(stateOf(repository_).underWay, IsEmpty());
+}
+
+TEST_F(FastForward, WritesNoMessageOfItsOwnIntoTheReflog)
+{
+    merge("topic");
+    EXPECT_EQ(repository_.line({"log", "--walk-reflogs", "-1", "--format=%gs", "main"}), "");
+    EXPECT_EQ(repository_.line({"log", "--walk-reflogs", "-1", "--format=%H", "main"}),
+              idOf("topic"));
+}
+
+TEST_F(FastForward, KeepsChangesThatItDoesNotTouch)
+{
+    repository_.git({"checkout", "--quiet", "topic"});
+    repository_.write("more", "x");
+    repository_.commitAll("more");
+    repository_.git({"checkout", "--quiet", "topic~1"});
+    repository_.write("same", "mine\n");
+    repository_.write("untracked", "mine\n");
+    merge("topic");
+    EXPECT_EQ(repository_.read("same"), "mine\n");
+    EXPECT_EQ(repository_.read("untracked"), "mine\n");
+    EXPECT_EQ(idOf("HEAD"), idOf("topic"));
+    EXPECT_THAT(status(), ElementsAre(" M same", "?? untracked"));
+}
+
+TEST_F(FastForward, IsRefusedByAChangeThatItTouches)
+{
+    repository_.write("file", "mine\n");
+    expectRefused(oneFileInTheWay);
+}
+
+TEST_F(FastForward, IsRefusedByAStagedChangeThatItTouches)
+{
+    repository_.write("file", "mine\n");
+    repository_.add({"file"});
+    expectRefused(oneFileInTheWay);
+}
+
+TEST_F(FastForward, IsRefusedByAnUntrackedFileInTheWay)
+{
+    repository_.write("folder/new", "mine\n");
+    expectRefused(oneFileInTheWay);
+}
+
+TEST_F(FastForward, IsRefusedByAChangeOfAFileThatItDrops)
+{
+    repository_.write("other", "mine\n");
+    expectRefused(oneFileInTheWay);
+}
+
+TEST_F(FastForward, OverwritesAnIgnoredFileAsGitDoes)
+{
+    repository_.write(".git/info/exclude", "folder/\n");
+    repository_.write("folder/new", "mine\n");
+    expectAsGit();
+    EXPECT_EQ(repository_.read("folder/new"), "x");
+}
+
+TEST_F(FastForward, LeavesTheBranchWhenItCannotBeMoved)
+{
+    const std::string before = idOf("main");
+    interactor_->progress.onCall = [this](std::size_t)
+    { repository_.write(".git/refs/heads/main.lock", ""); };
+    EXPECT_THAT(failureOfMerge("topic"), HasSubstr("(code -14"));
+    EXPECT_EQ(idOf("main"), before);
+    EXPECT_EQ(repository_.read("file"), "of topic\n");
+    EXPECT_EQ(branches().getRepositoryState(), "Normal");
+}
+
+TEST_F(FastForward, ShowsItsProgress)
+{
+    merge("topic");
+    EXPECT_THAT(interactor_->progress.calls,
+                ElementsAre(ProgressCall(0.0), ProgressCall(0.25),
+                            ProgressCall(ustring(u"Checking out other")), ProgressCall(0.5),
+                            ProgressCall(ustring(u"Checking out file")), ProgressCall(0.75),
+                            ProgressCall(ustring(u"Checking out folder/new")), ProgressCall(1.0),
+                            ProgressCall(ustring(u"Checking out same"))));
+}
+
+TEST_F(FastForward, GoesOnWhenItsProgressCannotBeShown)
+{
+    interactor_->progress.onCall = [](std::size_t) { throw std::runtime_error("no display"); };
+    EXPECT_NO_THROW(merge("topic"));
+    EXPECT_EQ(idOf("main"), idOf("topic"));
+    EXPECT_EQ(git::pendingCallbackException(), nullptr);
+}
+
+TEST_F(FastForward, CancelledBeforeItsStartMovesNothing)
+{
+    interactor_->cancel();
+    {
+        const NothingChanges nothing(repository_);
+        EXPECT_EQ(failureOfMerge("topic"), cancellation());
+    }
+    EXPECT_EQ(git::pendingCallbackException(), nullptr);
+    EXPECT_THAT(interactor_->progress.calls, IsEmpty());
+    EXPECT_NO_THROW(merge("topic"));
+    EXPECT_EQ(idOf("main"), idOf("topic"));
+}
+
+TEST_F(FastForward, CancelledAmongTheNotificationsMovesNothing)
+{
+    {
+        LogCapture log(git::SeverityProgress);
+        cancelAt(log, *interactor_, "Checkout Notify : ");
+        const NothingChanges nothing(repository_);
+        EXPECT_EQ(failureOfMerge("topic"), cancellation());
+    }
+    EXPECT_NO_THROW(merge("topic"));
+    EXPECT_EQ(idOf("main"), idOf("topic"));
+}
+
+/// libgit2 notifies of all files before it writes the first, so that nothing is left to stop this
+/// checkout.
+TEST_F(FastForward, CancelledWhileItWritesStopsTheNextCheckout)
+{
+    interactor_->progress.onCall = [this](std::size_t number)
+    {
+        if (number == 3)
+            interactor_->cancel();
+    };
+    EXPECT_NO_THROW(merge("topic"));
+    EXPECT_EQ(idOf("main"), idOf("topic"));
+    interactor_->progress.onCall = nullptr;
+    repository_.git({"reset", "--quiet", "--hard", "HEAD~1"});
+    const NothingChanges nothing(repository_);
+    EXPECT_EQ(failureOfMerge("topic"), cancellation());
+}
+
+/// Whatever the host's factory gives.
+TEST_F(FastForward, AlwaysChecksOutSafely)
+{
+    class Factory : public vclink::test::TestOptionsFactory
+    {
+      public:
+        using TestOptionsFactory::TestOptionsFactory;
+        git::CheckoutOptions makeCheckoutOptions() override
+        {
+            git::CheckoutOptions options;
+            options.checkoutStrategy = GIT_CHECKOUT_FORCE;
+            return options;
+        }
+    };
+    git::GitAdapter adapter(vclink::test::asPath(repository_.path()),
+                            std::make_shared<Factory>(interactor_));
+    repository_.write("file", "mine\n");
+    const NothingChanges nothing(repository_);
+    EXPECT_ANY_THROW(git::BranchManager::create(adapter)->merge("topic"));
+}
+
+} // namespace

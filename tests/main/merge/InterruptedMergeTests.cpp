@@ -1,0 +1,422 @@
+// SPDX-License-Identifier: MIT
+#include <csignal>
+#include <cstddef>
+#include <filesystem>
+#include <functional>
+#include <string>
+#include <vector>
+
+#include <git2/errors.h>
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+#include <sys/wait.h>
+#include <unistd.h>
+
+#include "MergeFixture.hpp"
+#include "support/Command.hpp"
+#include "support/text.hpp"
+
+namespace
+{
+
+namespace fs = std::filesystem;
+using testing::HasSubstr;
+using testing::IsEmpty;
+using vclink::test::Failure;
+using vclink::test::failureOf;
+using vclink::test::indexStampOf;
+using vclink::test::NothingChanges;
+using vclink::test::stateOf;
+
+constexpr const char *mergeMarker = ".git/vclink-merge";
+constexpr const char *indexLock = ".git/index.lock";
+
+/// A merge whose process was killed, and the commits that follow.
+class InterruptedMerge : public vclink::test::MergeFixture
+{
+  protected:
+    void commit() const
+    {
+        adapter_->commit(upath(), u"concluded");
+    }
+    bool exists(const std::string &name) const
+    {
+        return fs::exists(repository_ / name);
+    }
+    std::string markerOf(const std::string &ours, const std::string &theirs) const
+    {
+        return idOf(ours) + "\n" + idOf(theirs) + "\n";
+    }
+
+    /// Merges "topic" in a process that is killed at this call of the progress display, the first
+    /// of which comes before the first file is written.
+    void killMergeAt(std::size_t call) const
+    {
+        const pid_t child = ::fork();
+        ASSERT_GE(child, 0);
+        if (child == 0)
+        {
+            interactor_->progress.onCall = [call](std::size_t number)
+            {
+                if (number == call)
+                    ::kill(::getpid(), SIGKILL);
+            };
+            static_cast<void>(failureOf([this] { merge("topic"); }));
+            ::_exit(0);
+        }
+        int status = 0;
+        ASSERT_EQ(::waitpid(child, &status, 0), child);
+        ASSERT_TRUE(WIFSIGNALED(status)) << "the merge came to its end";
+    }
+    void expectRefused() const
+    {
+        const NothingChanges nothing(repository_);
+        const Failure failure = failureOf([this] { commit(); });
+        EXPECT_EQ(failure.code, GIT_ERROR);
+        EXPECT_EQ(failure.errorClass, GIT_ERROR_MERGE);
+        EXPECT_THAT(failure.text, HasSubstr("the merge of " + idOf("topic") + " was interrupted"));
+    }
+    /// What another program leaves that uses libgit2 and was killed before it wrote a file.
+    void beginMergeAsLibGit2() const
+    {
+        repository_.write(".git/MERGE_HEAD", idOf("topic") + "\n");
+        repository_.write(".git/MERGE_MODE", "no-ff");
+        repository_.write(".git/MERGE_MSG", "Merge branch 'topic'");
+    }
+    void expectRefusedForItsIndex() const
+    {
+        const NothingChanges nothing(repository_);
+        const Failure failure = failureOf([this] { commit(); });
+        EXPECT_EQ(failure.errorClass, GIT_ERROR_MERGE);
+        EXPECT_THAT(failure.text,
+                    HasSubstr("nothing of what only " + idOf("topic") + " has changed"));
+    }
+    void expectConcluded() const
+    {
+        commit();
+        EXPECT_EQ(parents().size(), 2U);
+        EXPECT_EQ(repository_.read(".git/HEAD"), "ref: refs/heads/main\n");
+        EXPECT_FALSE(exists(".git/MERGE_HEAD"));
+    }
+    /// The commands that the text of a refused commit tells to run.
+    std::string wayOut() const
+    {
+        const std::string text = failureOf([this] { commit(); }).text;
+        const std::string beginning = "in the root of the working copy: ";
+        const auto found = text.find(beginning);
+        return found == std::string::npos ? "false" : text.substr(found + beginning.size());
+    }
+    void run(const std::string &commands) const
+    {
+        const auto result =
+            vclink::test::Command({"sh", "-ec", commands}).in(repository_.path()).run();
+        EXPECT_TRUE(result.succeeded()) << commands;
+        EXPECT_EQ(result.errors, "") << commands;
+    }
+};
+
+/// Kinds of changes, in the order in which libgit2 writes them: deletions first.
+class KilledMerge : public InterruptedMerge, public testing::WithParamInterface<std::size_t>
+{
+  protected:
+    KilledMerge()
+    {
+        repository_.write("both", "1\n2\n3\n4\n5\n6\n7\n");
+        repository_.write("deleted", "x");
+        repository_.write("renamed", "one line\nand another\nand a third\n");
+        repository_.write("untouched", "x");
+        repository_.write("sub/tracked", "x");
+        repository_.write("becomes a file/a", "x");
+        repository_.write("becomes a file/b", "x");
+        repository_.write("becomes a folder", "x");
+        repository_.write(".gitignore", "*.ignored\n");
+        repository_.commitAll("more");
+        diverge(
+            [this]
+            {
+                repository_.write("both", "ours\n2\n3\n4\n5\n6\n7\n");
+                repository_.git({"mv", "renamed", "of another name"});
+            },
+            [this]
+            {
+                repository_.write("both", "1\n2\n3\n4\n5\n6\ntheirs\n");
+                repository_.remove("deleted");
+                repository_.write("renamed", "one line\nand another\nand a third\nof theirs\n");
+                repository_.write("file", "theirs\n");
+                repository_.write("new", std::string("\0binary\1", 8));
+                repository_.write("sub/new", "theirs\n");
+                repository_.write("fresh/new", "theirs\n");
+                repository_.remove("becomes a file");
+                repository_.write("becomes a file", "theirs\n");
+                repository_.remove("becomes a folder");
+                repository_.write("becomes a folder/a", "theirs\n");
+                repository_.write("becomes a folder/b", "theirs\n");
+                repository_.write("forced.ignored", "theirs\n");
+                repository_.git({"add", "--force", "forced.ignored"});
+            });
+        repository_.write("untracked", "mine");
+        repository_.write("sub/untracked", "mine");
+        repository_.write("mine.ignored", "mine");
+        before_ = stateOf(repository_);
+    }
+
+    vclink::test::RepositoryState before_;
+};
+
+TEST_P(KilledMerge, IsNotConcludedByACommit)
+{
+    killMergeAt(GetParam());
+    EXPECT_EQ(repository_.read(mergeMarker), markerOf("main", "topic"));
+    ASSERT_TRUE(exists(indexLock));
+    EXPECT_EQ(failureOf([this] { commit(); }).code, GIT_ELOCKED);
+    repository_.remove(indexLock);
+    expectRefused();
+    repository_.git({"add", "--update"});
+    expectRefused();
+}
+
+TEST_P(KilledMerge, IsTakenBackByTheCommandsThatTheRefusalNames)
+{
+    killMergeAt(GetParam());
+    repository_.remove(indexLock);
+    run(wayOut());
+    const auto after = stateOf(repository_);
+    EXPECT_EQ(after.head, before_.head);
+    EXPECT_EQ(after.index, before_.index);
+    EXPECT_EQ(after.workingTree, before_.workingTree);
+    EXPECT_EQ(after.underWay.count("MERGE_HEAD"), 0U);
+    merge("topic");
+    EXPECT_EQ(parents(), (std::vector<std::string>{idOf("main^"), idOf("topic")}));
+    EXPECT_EQ(repository_.read("both"), "ours\n2\n3\n4\n5\n6\ntheirs\n");
+    EXPECT_EQ(repository_.read("sub/new"), "theirs\n");
+    EXPECT_EQ(repository_.read("becomes a file"), "theirs\n");
+    EXPECT_EQ(repository_.read("becomes a folder/b"), "theirs\n");
+    EXPECT_THAT(repository_.read("of another name"), HasSubstr("of theirs"));
+    EXPECT_FALSE(exists("deleted"));
+    EXPECT_EQ(repository_.read("sub/untracked"), "mine");
+}
+
+TEST_P(KilledMerge, IsTakenBackWithoutWhatWasEditedSince)
+{
+    killMergeAt(GetParam());
+    repository_.remove(indexLock);
+    repository_.write("untouched", "edited since\n");
+    repository_.write("file", "edited since, in a file of the merge\n");
+    repository_.write("later", "edited since\n");
+    repository_.write("sub/later", "edited since\n");
+    run(wayOut());
+    EXPECT_EQ(repository_.read("untouched"), "edited since\n");
+    EXPECT_EQ(repository_.read("later"), "edited since\n");
+    EXPECT_EQ(repository_.read("sub/later"), "edited since\n");
+    EXPECT_EQ(repository_.git({"show", "stash@{0}:file"}),
+              "edited since, in a file of the merge\n");
+    EXPECT_EQ(repository_.git({"status", "--porcelain", "--untracked-files=no"}), " M untouched\n");
+    commit();
+    merge("topic");
+    EXPECT_EQ(repository_.git({"show", "HEAD:untouched"}), "edited since\n");
+    EXPECT_EQ(repository_.git({"show", "HEAD:fresh/new"}), "theirs\n");
+}
+
+INSTANTIATE_TEST_SUITE_P(AtCall, KilledMerge, testing::Values(1U, 2U, 3U, 4U, 6U, 8U, 10U, 12U));
+
+TEST_F(InterruptedMerge, OfConflictsOnlyIsNotConcludedByACommit)
+{
+    diverge(writing("file", "ours\n"), writing("file", "theirs\n"));
+    killMergeAt(1);
+    repository_.remove(indexLock);
+    expectRefused();
+    run(wayOut());
+    expectConflicts("topic");
+}
+
+TEST_F(InterruptedMerge, IsToldByAMarkerThatWasCutShortItself)
+{
+    makeDiverged();
+    beginMergeAsLibGit2();
+    repository_.write(mergeMarker, idOf("main").substr(0, 20));
+    expectRefused();
+    repository_.write(mergeMarker, "");
+    expectRefused();
+}
+
+TEST_F(InterruptedMerge, IsNotToldByTheMarkerOfAnother)
+{
+    makeDiverged();
+    repository_.write(mergeMarker, markerOf("main", "main^"));
+    repository_.git({"merge", "--quiet", "--no-commit", "topic"});
+    repository_.remove(".git/AUTO_MERGE");
+    expectConcluded();
+}
+
+TEST_F(InterruptedMerge, IsNotConcludedOnAnotherBranchEither)
+{
+    makeDiverged();
+    makeBranch("third", writing("third", "x"), "main^");
+    killMergeAt(2);
+    repository_.remove(indexLock);
+    repository_.git({"symbolic-ref", "HEAD", "refs/heads/third"});
+    repository_.git({"reset", "--quiet", "--", "."});
+    expectRefused();
+    repository_.write("copied", "x");
+    repository_.git({"add", "--all"});
+    expectRefused();
+}
+
+TEST_F(InterruptedMerge, IsOverOnceGitHasAbortedIt)
+{
+    diverge(writing("file", "ours\n"), writing("file", "theirs\n"));
+    killMergeAt(1);
+    repository_.remove(indexLock);
+    repository_.git({"merge", "--abort"});
+    repository_.tryGit({"merge", "topic"});
+    repository_.git({"checkout", "--quiet", "--ours", "file"});
+    repository_.add({"file"});
+    expectConcluded();
+}
+
+TEST_F(InterruptedMerge, IsNotHiddenByWhatGitLeftOfAnEarlierOne)
+{
+    diverge(writing("file", "ours\n"), writing("theirs", "x"));
+    makeBranch("before", writing("earlier", "x"), "main^");
+    repository_.git({"merge", "--quiet", "--no-commit", "before"});
+    ASSERT_TRUE(exists(".git/AUTO_MERGE"));
+    commit();
+    killMergeAt(1);
+    repository_.remove(indexLock);
+    expectRefused();
+}
+
+TEST_F(InterruptedMerge, OfNoDifferenceLacksNothing)
+{
+    diverge(writing("file", "same\n"), writing("file", "same\n"));
+    killMergeAt(1);
+    repository_.remove(indexLock);
+    expectConcluded();
+}
+
+TEST_F(InterruptedMerge, LeavesAMarkerThatTheNextCommitRemoves)
+{
+    repository_.write(mergeMarker, markerOf("main", "main"));
+    commit();
+    EXPECT_FALSE(exists(mergeMarker));
+}
+
+/// How a merge ends, other than by a signal.
+TEST_F(InterruptedMerge, IsNoneThatHasEnded)
+{
+    makeDiverged();
+    makeBranch("cancelled", writing("other", "theirs\n"), "main^");
+    repository_.write(mergeMarker, markerOf("main", "topic"));
+    merge("topic");
+    EXPECT_FALSE(exists(mergeMarker));
+    interactor_->cancel();
+    EXPECT_NE(failureOfMerge("cancelled"), "");
+    EXPECT_FALSE(exists(mergeMarker));
+    repository_.write("other", "edited\n");
+    EXPECT_NE(failureOfMerge("cancelled"), "");
+    EXPECT_FALSE(exists(mergeMarker));
+    EXPECT_FALSE(exists(indexLock));
+}
+
+TEST_F(InterruptedMerge, StandsInItsMarkerWhileFilesAreWritten)
+{
+    makeDiverged();
+    const std::string expected = markerOf("main", "topic");
+    std::size_t calls = 0;
+    interactor_->progress.onCall = [&](std::size_t)
+    {
+        ++calls;
+        EXPECT_EQ(repository_.read(mergeMarker), expected);
+        EXPECT_TRUE(exists(indexLock));
+    };
+    merge("topic");
+    EXPECT_GT(calls, 0U);
+    EXPECT_FALSE(exists(mergeMarker));
+}
+
+TEST_F(InterruptedMerge, OfConflictsLeavesNoMarker)
+{
+    diverge(writing("file", "ours\n"), writing("file", "theirs\n"));
+    expectConflicts("topic");
+    EXPECT_FALSE(exists(mergeMarker));
+    EXPECT_FALSE(exists(indexLock));
+    repository_.write("file", "ours\n");
+    repository_.add({"file"});
+    expectConcluded();
+}
+
+TEST_F(InterruptedMerge, ByAnotherProgramIsToldByItsIndex)
+{
+    makeDiverged();
+    beginMergeAsLibGit2();
+    expectRefusedForItsIndex();
+    run(wayOut());
+    merge("topic");
+    EXPECT_EQ(parents().size(), 2U);
+}
+
+TEST_F(InterruptedMerge, ByAnotherProgramIsToldByADeletionOrAMode)
+{
+    diverge(writing("ours", "x"), [this] { repository_.remove("other"); });
+    beginMergeAsLibGit2();
+    expectRefusedForItsIndex();
+    repository_.git({"rm", "--quiet", "other"});
+    expectConcluded();
+}
+
+TEST_F(InterruptedMerge, ByAnotherProgramHasNothingInCommon)
+{
+    repository_.git({"checkout", "--quiet", "--orphan", "topic"});
+    repository_.git({"rm", "--quiet", "-rf", "."});
+    repository_.write("theirs", "x");
+    repository_.commitAll("theirs");
+    repository_.git({"checkout", "--quiet", "main"});
+    beginMergeAsLibGit2();
+    expectRefusedForItsIndex();
+}
+
+TEST_F(InterruptedMerge, IsNoneWhereTheIndexHasSomeOfTheirs)
+{
+    makeDiverged();
+    beginMergeAsLibGit2();
+    repository_.git({"checkout", "--quiet", "topic", "--", "theirs"});
+    expectConcluded();
+}
+
+TEST_F(InterruptedMerge, IsNoneWhereAllConflictsWereResolvedToOurs)
+{
+    diverge(writing("file", "ours\n"), writing("file", "theirs\n"));
+    beginMergeAsLibGit2();
+    expectConcluded();
+}
+
+TEST_F(InterruptedMerge, IsNoneOfGit)
+{
+    makeDiverged();
+    repository_.write(".git/MERGE_HEAD", idOf("topic") + "\n");
+    repository_.write(".git/MERGE_MODE", "");
+    expectConcluded();
+}
+
+TEST_F(InterruptedMerge, IsNoneOfSeveralHeads)
+{
+    makeDiverged();
+    makeBranch("third", writing("third", "x"), "main^");
+    beginMergeAsLibGit2();
+    repository_.write(".git/MERGE_HEAD", idOf("topic") + "\n" + idOf("third") + "\n");
+    commit();
+    EXPECT_EQ(parents().size(), 3U);
+}
+
+/// Can't be told from one that was killed: the text names git's own commit as well.
+TEST_F(InterruptedMerge, IsSuspectedWhereEverythingOfTheirsWasPutBack)
+{
+    makeDiverged();
+    repository_.git({"merge", "--quiet", "--no-commit", "--strategy=ours", "topic"});
+    expectRefusedForItsIndex();
+    EXPECT_THAT(failureOf([this] { commit(); }).text, HasSubstr("run: git commit"));
+    repository_.git({"commit", "--quiet", "--no-edit"});
+    EXPECT_EQ(parents().size(), 2U);
+}
+
+} // namespace

@@ -1,0 +1,313 @@
+// SPDX-License-Identifier: MIT
+#include <string>
+#include <vector>
+
+#include <git2.h>
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include "main/files/CommitFixture.hpp"
+
+namespace
+{
+
+using testing::Contains;
+using testing::ElementsAre;
+using testing::IsEmpty;
+using testing::Not;
+using vclink::test::Failure;
+using vclink::test::failureOf;
+using vclink::test::GitRepository;
+using vclink::test::linesOf;
+using vclink::test::NothingChanges;
+using vclink::test::stateOf;
+
+const std::string missingMergeHead = "1234567890123456789012345678901234567890";
+
+/// A commit that ends a merge which is under way, and what becomes of the conflicts in it.
+class MergeConclusion : public vclink::test::CommitFixture
+{
+  protected:
+    /// Makes a branch off main whose commit adds one file of the same name.
+    void makeBranch(const std::string &name)
+    {
+        repository_.git({"checkout", "--quiet", "-b", name, "main"});
+        repository_.write(name, "x");
+        repository_.commitAll(name);
+        repository_.git({"checkout", "--quiet", "main"});
+    }
+    /// Begins a merge without conflicts and does not commit it.
+    void beginCleanMerge(const std::vector<std::string> &branches)
+    {
+        for (const auto &branch : branches)
+            makeBranch(branch);
+        repository_.write("ours", "x");
+        repository_.commitAll("ours");
+        std::vector<std::string> arguments{"merge", "--quiet", "--no-commit"};
+        arguments.insert(arguments.end(), branches.begin(), branches.end());
+        repository_.git(arguments);
+    }
+    void expectNothingUnderWay() const
+    {
+        auto underWay = stateOf(repository_).underWay;
+        underWay.erase("ORIG_HEAD");
+        EXPECT_THAT(underWay, IsEmpty());
+        EXPECT_EQ(repository_.git({"status"}).find("merging"), std::string::npos);
+    }
+    void expectFailure(const Failure &failure) const
+    {
+        const NothingChanges nothing(repository_);
+        EXPECT_EQ(failureOf([this] { commit(); }), failure);
+    }
+};
+
+TEST_F(MergeConclusion, HasTheMergeHeadAsItsSecondParent)
+{
+    beginCleanMerge({"theirs"});
+    const std::string head = idOf("HEAD");
+    commit();
+    EXPECT_THAT(parents(), ElementsAre(head, idOf("theirs")));
+    EXPECT_THAT(namesIn(), ElementsAre("file", "other", "ours", "sub/inside", "theirs"));
+    expectNothingUnderWay();
+    EXPECT_THAT(status(), IsEmpty());
+    EXPECT_EQ(repository_.git({"fsck", "--strict", "--no-dangling"}), "");
+}
+
+TEST_F(MergeConclusion, OfTwoHeadsHasThreeParentsInTheirOrder)
+{
+    beginCleanMerge({"one", "two"});
+    const std::string head = idOf("HEAD");
+    commit();
+    EXPECT_THAT(parents(), ElementsAre(head, idOf("one"), idOf("two")));
+    EXPECT_THAT(namesIn(), ElementsAre("file", "one", "other", "ours", "sub/inside", "two"));
+    expectNothingUnderWay();
+}
+
+TEST_F(MergeConclusion, FollowsTheOrderOfTheMergeHeads)
+{
+    beginCleanMerge({"one", "two"});
+    const std::string head = idOf("HEAD");
+    repository_.write(".git/MERGE_HEAD", idOf("two") + '\n' + idOf("one") + '\n');
+    commit();
+    EXPECT_THAT(parents(), ElementsAre(head, idOf("two"), idOf("one")));
+}
+
+TEST_F(MergeConclusion, HoldsWhatChangedSinceTheMergeBegan)
+{
+    beginCleanMerge({"theirs"});
+    repository_.write("theirs", "changed\n");
+    repository_.remove("other");
+    repository_.write("new", "x");
+    commit();
+    EXPECT_EQ(committed("theirs"), "changed\n");
+    EXPECT_THAT(namesIn(), ElementsAre("file", "ours", "sub/inside", "theirs"));
+    EXPECT_THAT(status(), ElementsAre("?? new"));
+}
+
+TEST_F(MergeConclusion, LeavesTheMessageOfTheMergeBehind)
+{
+    beginCleanMerge({"theirs"});
+    ASSERT_NE(repository_.read(".git/MERGE_MSG").find("Merge"), std::string::npos);
+    commit("my own");
+    EXPECT_EQ(repository_.line({"log", "-1", "--format=%B"}), "my own");
+    EXPECT_EQ(repository_.line({"log", "--walk-reflogs", "-1", "--format=%gs"}),
+              "commit (merge): my own");
+}
+
+TEST_F(MergeConclusion, OnADetachedHeadWorks)
+{
+    makeBranch("theirs");
+    repository_.git({"checkout", "--quiet", "--detach"});
+    repository_.git({"merge", "--quiet", "--no-commit", "--no-ff", "theirs"});
+    const std::string head = idOf("HEAD");
+    commit();
+    EXPECT_THAT(parents(), ElementsAre(head, idOf("theirs")));
+    EXPECT_EQ(idOf("main"), head);
+    expectNothingUnderWay();
+}
+
+TEST_F(MergeConclusion, InALinkedWorktreeEndsThatOnesMerge)
+{
+    makeBranch("theirs");
+    const std::string linked = folder() / "linked";
+    repository_.git({"worktree", "add", "--quiet", "-b", "second", linked});
+    const GitRepository worktree(linked);
+    worktree.git({"merge", "--quiet", "--no-commit", "--no-ff", "theirs"});
+    commitIn(worktree);
+    EXPECT_EQ(idOf("second^2"), idOf("theirs"));
+    EXPECT_THAT(stateOf(worktree).underWay, Not(Contains(testing::Key("MERGE_HEAD"))));
+}
+
+TEST_F(MergeConclusion, TakesAFileInConflictAsItStands)
+{
+    beginMerge({"file"});
+    const std::string head = idOf("HEAD");
+    const std::string standing = repository_.read("file");
+    ASSERT_NE(standing.find("<<<<<<<"), std::string::npos);
+    commit();
+    EXPECT_EQ(committed("file"), standing);
+    EXPECT_EQ(repository_.read("file"), standing);
+    EXPECT_THAT(parents(), ElementsAre(head, idOf("theirs")));
+    EXPECT_EQ(repository_.git({"ls-files", "--unmerged"}), "");
+    EXPECT_THAT(status(), IsEmpty());
+    expectNothingUnderWay();
+}
+
+TEST_F(MergeConclusion, TakesAFileWhoseMarkersWereEditedAwayAsItStands)
+{
+    beginMerge({"file", "sub/inside"});
+    repository_.write("file", "merged\n");
+    commit();
+    EXPECT_EQ(committed("file"), "merged\n");
+    EXPECT_NE(committed("sub/inside").find(">>>>>>> theirs"), std::string::npos);
+    EXPECT_EQ(repository_.git({"ls-files", "--unmerged"}), "");
+}
+
+/// libgit2 takes it as deleted, all stages of it.
+TEST_F(MergeConclusion, DropsAConflictWhereNoFileStands)
+{
+    beginMerge({"file", "other"});
+    repository_.remove("file");
+    commit();
+    EXPECT_THAT(namesIn(), ElementsAre("other", "sub/inside"));
+    EXPECT_EQ(repository_.git({"ls-files"}), "other\nsub/inside\n");
+    expectNothingUnderWay();
+}
+
+TEST_F(MergeConclusion, DropsAConflictWhereAFolderStands)
+{
+    beginMerge({"file"});
+    repository_.remove("file");
+    repository_.write("file/new", "x");
+    commit();
+    EXPECT_THAT(namesIn(), ElementsAre("other", "sub/inside"));
+    EXPECT_THAT(status(), ElementsAre("?? file/new"));
+}
+
+TEST_F(MergeConclusion, TakesTheirFileThatWeDeletedWhereItStands)
+{
+    repository_.git({"branch", "theirs"});
+    repository_.remove("file");
+    repository_.commitAll("ours");
+    repository_.git({"checkout", "--quiet", "theirs"});
+    repository_.write("file", "theirs\n");
+    repository_.commitAll("theirs");
+    repository_.git({"checkout", "--quiet", "main"});
+    EXPECT_FALSE(repository_.tryGit({"merge", "--quiet", "theirs"}).succeeded());
+    ASSERT_EQ(linesOf(repository_.git({"ls-files", "--unmerged"})).size(), 2U);
+    commit();
+    EXPECT_EQ(committed("file"), "theirs\n");
+    expectNothingUnderWay();
+}
+
+TEST_F(MergeConclusion, DropsAConflictOfOneStageWhereNoFileStands)
+{
+    const std::string id = idOf("HEAD:file");
+    for (const std::string stage : {"1", "2", "3"})
+    {
+        repository_.git({"reset", "--quiet", "--hard", "main"});
+        const std::string nothing = "0 0000000000000000000000000000000000000000\tfile\n";
+        repository_.command({"update-index", "--index-info"})
+            .input(nothing + "100644 " + id + ' ' + stage + "\tfile\n")
+            .run();
+        ASSERT_EQ(repository_.git({"ls-files", "--unmerged"}),
+                  "100644 " + id + ' ' + stage + "\tfile\n");
+        repository_.remove("file");
+        commit();
+        EXPECT_THAT(namesIn(), ElementsAre("other", "sub/inside")) << stage;
+        repository_.git({"reset", "--quiet", "--hard", "HEAD^"});
+    }
+}
+
+TEST_F(MergeConclusion, FailsWithGarbageForAMergeHead)
+{
+    beginMerge({"file"});
+    repository_.write(".git/MERGE_HEAD", "garbage\n");
+    expectFailure({GIT_ERROR, GIT_ERROR_INVALID, "unable to parse OID - invalid length"});
+}
+
+TEST_F(MergeConclusion, FailsWithGarbageAfterAGoodMergeHead)
+{
+    beginMerge({"file"});
+    repository_.write(".git/MERGE_HEAD", idOf("theirs") + "\ngarbage\n");
+    expectFailure({GIT_ERROR, GIT_ERROR_INVALID, "unable to parse OID - invalid length"});
+}
+
+TEST_F(MergeConclusion, FailsWithAMergeHeadThatIsCutShort)
+{
+    beginMerge({"file"});
+    repository_.write(".git/MERGE_HEAD", idOf("theirs"));
+    expectFailure({GIT_ERROR, GIT_ERROR_MERGE, "no EOL at line 1"});
+}
+
+TEST_F(MergeConclusion, FailsWithAMergeHeadWhoseCommitIsMissing)
+{
+    beginMerge({"file"});
+    repository_.write(".git/MERGE_HEAD", missingMergeHead + '\n');
+    expectFailure({GIT_ENOTFOUND, GIT_ERROR_ODB,
+                   "object not found - no match for id (" + missingMergeHead + ")"});
+}
+
+TEST_F(MergeConclusion, FailsWithAMissingSecondMergeHead)
+{
+    beginMerge({"file"});
+    repository_.write(".git/MERGE_HEAD", idOf("theirs") + '\n' + missingMergeHead + '\n');
+    expectFailure({GIT_ENOTFOUND, GIT_ERROR_ODB,
+                   "object not found - no match for id (" + missingMergeHead + ")"});
+}
+
+TEST_F(MergeConclusion, FailsWithAMergeHeadThatIsNoCommit)
+{
+    beginMerge({"file"});
+    repository_.write(".git/MERGE_HEAD", idOf("HEAD:other") + '\n');
+    expectFailure({GIT_ENOTFOUND, GIT_ERROR_INVALID,
+                   "the requested type does not match the type in the ODB"});
+}
+
+TEST_F(MergeConclusion, FailsWithAMergeHeadThatCannotBeRead)
+{
+    beginMerge({"file"});
+    giveAway();
+    const std::string file = repository_ / ".git/MERGE_HEAD";
+    const auto before = stateOf(repository_);
+    const auto index = vclink::test::indexStampOf(repository_);
+    repository_.setMode(".git/MERGE_HEAD", 0000);
+    EXPECT_EQ(commitAsItsOwner(),
+              "-14 2 failed open - '" + file + "' is locked: Permission denied");
+    repository_.setMode(".git/MERGE_HEAD", 0644);
+    EXPECT_EQ(stateOf(repository_), before);
+    EXPECT_EQ(vclink::test::indexStampOf(repository_), index);
+}
+
+TEST_F(MergeConclusion, TakesNoParentFromAnEmptyMergeHead)
+{
+    beginMerge({"file"});
+    const std::string head = idOf("HEAD");
+    repository_.write(".git/MERGE_HEAD", "");
+    commit();
+    EXPECT_THAT(parents(), ElementsAre(head));
+    expectNothingUnderWay();
+}
+
+TEST_F(MergeConclusion, TakesAMergeHeadAsOftenAsItIsListed)
+{
+    beginMerge({"file"});
+    const std::string head = idOf("HEAD");
+    const std::string theirs = idOf("theirs");
+    repository_.write(".git/MERGE_HEAD", theirs + '\n' + theirs + '\n');
+    commit();
+    EXPECT_THAT(linesOf(repository_.git({"log", "-1", "--format=%P"})),
+                ElementsAre(head + ' ' + theirs + ' ' + theirs));
+}
+
+TEST_F(MergeConclusion, WithoutACommitAtHeadHasTheMergeHeadAsItsOnlyParent)
+{
+    const std::string main = idOf("main");
+    repository_.git({"checkout", "--quiet", "--orphan", "second"});
+    repository_.write(".git/MERGE_HEAD", main + '\n');
+    commit();
+    EXPECT_THAT(parents(), ElementsAre(main));
+    expectNothingUnderWay();
+}
+
+} // namespace

@@ -1,0 +1,91 @@
+// SPDX-License-Identifier: MIT
+#include <string>
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include "MergeFixture.hpp"
+#include "support/text.hpp"
+
+namespace
+{
+
+using testing::ElementsAre;
+using testing::IsEmpty;
+using vclink::test::asPath;
+
+/// Conflicts resolved by the host's own operations.
+class MergeConflictsResolved : public vclink::test::MergeFixture
+{
+  protected:
+    MergeConflictsResolved()
+    {
+        repository_.write(".gitattributes", "binary -merge\n");
+        repository_.write("binary", "ancestor\n");
+        repository_.commitAll("attributes");
+        diverge(
+            [this]
+            {
+                repository_.write("file", "ours\n");
+                repository_.write("binary", "ours\n");
+                repository_.remove("other");
+            },
+            [this]
+            {
+                repository_.write("file", "theirs\n");
+                repository_.write("binary", "theirs\n");
+                repository_.write("other", "theirs\n");
+                repository_.write("new", "x");
+            });
+        expectConflicts("topic");
+    }
+    void markResolved(const std::string &name) const
+    {
+        adapter_->markResolved(asPath(repository_ / name));
+    }
+};
+
+TEST_F(MergeConflictsResolved, AreCommittedWithBothParents)
+{
+    const std::string ours = idOf("HEAD");
+    repository_.write("file", "both\n");
+    repository_.write("binary", "theirs\n");
+    repository_.remove("other");
+    markResolved("file");
+    markResolved("binary");
+    markResolved("other");
+    EXPECT_THAT(conflicts(), IsEmpty());
+    EXPECT_EQ(branches().getRepositoryState(), "Conflicts");
+    adapter_->commit(upath(), u"by hand");
+    EXPECT_EQ(branches().getRepositoryState(), "Normal");
+    EXPECT_THAT(parents(), ElementsAre(ours, idOf("topic")));
+    EXPECT_EQ(message(), "by hand");
+    EXPECT_THAT(status(), IsEmpty());
+    EXPECT_EQ(repository_.git({"ls-tree", "-r", "--name-only", "HEAD"}),
+              ".gitattributes\nbinary\nfile\nnew\n");
+    EXPECT_EQ(repository_.git({"cat-file", "blob", "HEAD:file"}), "both\n");
+    EXPECT_EQ(repository_.git({"fsck", "--strict", "--no-dangling"}), "");
+}
+
+TEST_F(MergeConflictsResolved, AreStatesThatTheAdapterTells)
+{
+    auto states = allStates(repository_);
+    EXPECT_EQ(states["file"], "InConflict");
+    EXPECT_EQ(states["binary"], "InConflict");
+    EXPECT_EQ(states["other"], "InConflict");
+    EXPECT_EQ(states["new"], "Added");
+    markResolved("file");
+    EXPECT_NE(allStates(repository_)["file"], "InConflict");
+}
+
+TEST_F(MergeConflictsResolved, LetTheNextMergeBegin)
+{
+    for (const auto *name : {"file", "binary", "other"})
+        markResolved(name);
+    adapter_->commit(upath(), u"by hand");
+    makeBranch("second", [this] { repository_.write("second", "x"); });
+    EXPECT_NO_THROW(merge("second"));
+    EXPECT_NO_THROW(merge("topic")) << "up to date";
+}
+
+} // namespace

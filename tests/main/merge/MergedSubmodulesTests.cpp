@@ -1,0 +1,401 @@
+// SPDX-License-Identifier: MIT
+#include <functional>
+#include <memory>
+#include <string>
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include "MergeFixture.hpp"
+#include "support/text.hpp"
+
+namespace
+{
+
+using testing::ElementsAre;
+using testing::IsEmpty;
+using vclink::test::asPath;
+using vclink::test::GitRepository;
+
+/// Merges of branches that have the submodule "module", whose repository has three commits.
+class MergedSubmodules : public vclink::test::MergeFixture
+{
+  protected:
+    MergedSubmodules()
+    {
+        auto inner = addModule();
+        first_ = idOf("HEAD:module");
+        inner.write("inner", "2\n");
+        second_ = inner.commitAll("inner 2");
+        inner.write("inner", "3\n");
+        third_ = inner.commitAll("inner 3");
+        module_.git({"fetch", "--quiet"});
+    }
+
+    /// Checks a commit out in the submodule.
+    void go(const std::string &id) const
+    {
+        module_.git({"checkout", "--quiet", id});
+    }
+    std::function<void()> moving(const std::string &id) const
+    {
+        return [this, id] { go(id); };
+    }
+    std::function<void()> removing() const
+    {
+        return [this] { repository_.git({"rm", "--quiet", "--cached", "module", ".gitmodules"}); };
+    }
+    /// "topic" moves the submodule to the second commit. Ours stays at the first, which is also
+    /// checked out, and has another change.
+    void theyMove(const std::function<void()> &ours)
+    {
+        diverge(
+            [&]
+            {
+                go(first_);
+                ours();
+            },
+            moving(second_));
+    }
+    /// The same, and "file" is in conflict.
+    void theyMoveInConflict()
+    {
+        makeBranch("topic",
+                   [this]
+                   {
+                       go(second_);
+                       repository_.write("file", "theirs\n");
+                   });
+        go(first_);
+        repository_.write("file", "ours\n");
+        repository_.commitAll("on main");
+    }
+    /// "topic" takes the submodule out of the index and leaves its folder.
+    void theyRemove(const std::function<void()> &ours, const std::string &file = "theirs")
+    {
+        repository_.git({"checkout", "--quiet", "-b", "topic"});
+        removing()();
+        repository_.write(file, "theirs\n");
+        repository_.add({file});
+        repository_.commit("on topic");
+        repository_.git({"checkout", "--quiet", "--force", "main"});
+        ours();
+        repository_.commitAll("on main");
+    }
+    /// Goes to a branch from before the submodule, whose folder stays.
+    void leaveSubmodule()
+    {
+        repository_.git({"checkout", "--quiet", "-b", "before", idOf("main~1")});
+        writing("ours", "x")();
+        repository_.add({"ours"});
+        repository_.commit("on before");
+    }
+    /// Merges "topic", which has moved the submodule, into main, which has removed it and left its
+    /// folder.
+    void weRemoveAndTheyMove()
+    {
+        makeBranch("topic", moving(second_));
+        removing()();
+        repository_.commit("on main");
+        repository_.write(".git/info/exclude", "/module\n");
+        expectConflicts("topic");
+    }
+    static vclink::test::CommandResult commitByGit(const GitRepository &repository)
+    {
+        return repository.tryGit({"commit", "--quiet", "--all", "--message", "merged"});
+    }
+    /// Commits as the library does, and as `git commit --all` does in a twin.
+    void expectCommitAsGit() const
+    {
+        const GitRepository twin = makeTwin();
+        EXPECT_TRUE(commitByGit(twin).succeeded());
+        commit();
+        EXPECT_EQ(idOf("HEAD^{tree}"), twin.line({"rev-parse", "HEAD^{tree}"}));
+        EXPECT_THAT(parents(), testing::SizeIs(2));
+    }
+    void expectAsGitBesideTheFolder() const
+    {
+        const auto expected = outcomeByGit("topic");
+        const auto outcome = outcomeByLibrary("topic");
+        EXPECT_EQ(outcome.index, expected.index);
+        EXPECT_EQ(outcome.tree, expected.tree);
+        EXPECT_EQ(outcome.parents, expected.parents);
+        EXPECT_EQ(outcome.mergeHead, expected.mergeHead);
+    }
+    void commit() const
+    {
+        adapter_->commit(upath(), ustring(u"merged"));
+    }
+
+    const GitRepository module_{repository_ / "module"};
+    std::string first_;
+    std::string second_;
+    std::string third_;
+};
+
+TEST_F(MergedSubmodules, TakeTheCommitOfTheSideThatMovedThem)
+{
+    theyMove(writing("ours", "x"));
+    ASSERT_EQ(idOf("main:module"), first_);
+    ASSERT_EQ(idOf("topic:module"), second_);
+    expectAsGitBesideTheFolder();
+    EXPECT_EQ(idOf("HEAD:module"), second_);
+    EXPECT_EQ(module_.line({"rev-parse", "HEAD"}), first_) << "what is checked out stays";
+}
+
+TEST_F(MergedSubmodules, KeepTheCommitThatOursMovedThemTo)
+{
+    diverge(moving(third_), writing("theirs", "x"));
+    expectAsGitBesideTheFolder();
+    EXPECT_EQ(idOf("HEAD:module"), third_);
+}
+
+TEST_F(MergedSubmodules, DoNotTakeWhatIsCheckedOutIntoTheMerge)
+{
+    theyMove(writing("ours", "x"));
+    go(third_);
+    expectAsGitBesideTheFolder();
+    EXPECT_EQ(idOf("HEAD:module"), second_);
+    EXPECT_THAT(status(), ElementsAre(" M module"));
+    // The user's choice is the next commit's.
+    commit();
+    EXPECT_EQ(idOf("HEAD:module"), third_);
+}
+
+TEST_F(MergedSubmodules, ThatNobodyMovedAreNotTakenFromWhatIsCheckedOut)
+{
+    diverge(writing("ours", "x"), writing("theirs", "x"));
+    go(third_);
+    expectAsGitBesideTheFolder();
+    EXPECT_EQ(idOf("HEAD:module"), first_);
+}
+
+TEST_F(MergedSubmodules, StayAsMergedInACommitByHand)
+{
+    theyMoveInConflict();
+    expectConflicts("topic");
+    repository_.write("file", "both\n");
+    commit();
+    EXPECT_EQ(idOf("HEAD:module"), second_);
+    EXPECT_THAT(parents(), testing::SizeIs(2));
+}
+
+TEST_F(MergedSubmodules, AreTheUsersInACommitByHandAfterACheckout)
+{
+    theyMoveInConflict();
+    expectConflicts("topic");
+    repository_.write("file", "both\n");
+    go(third_);
+    commit();
+    EXPECT_EQ(idOf("HEAD:module"), third_);
+}
+
+TEST_F(MergedSubmodules, AreGoneInACommitByHandWithTheirFolder)
+{
+    theyMoveInConflict();
+    expectConflicts("topic");
+    repository_.write("file", "both\n");
+    repository_.remove("module");
+    commit();
+    EXPECT_EQ(repository_.line({"ls-tree", "--name-only", "HEAD", "module"}), "");
+}
+
+TEST_F(MergedSubmodules, OfAMergeByGitStayAsMergedInACommit)
+{
+    theyMove(writing("ours", "x"));
+    repository_.git({"merge", "--quiet", "--no-commit", "topic"});
+    commit();
+    EXPECT_EQ(idOf("HEAD:module"), second_);
+}
+
+TEST_F(MergedSubmodules, InConflictAreTakenAsTheyAreCheckedOut)
+{
+    diverge(moving(third_),
+            [this]
+            {
+                go(second_);
+                GitRepository(module_).commitAll("theirs");
+            });
+    go(third_);
+    expectConflicts("topic");
+    EXPECT_THAT(conflicts(), ElementsAre("1 module", "2 module", "3 module"));
+    commit();
+    EXPECT_EQ(idOf("HEAD:module"), third_);
+    EXPECT_THAT(status(), IsEmpty());
+}
+
+TEST_F(MergedSubmodules, InConflictAreTakenAsTheUserHasCheckedThemOut)
+{
+    diverge(moving(third_), moving(second_));
+    go(third_);
+    expectConflicts("topic");
+    go(first_);
+    commit();
+    EXPECT_EQ(idOf("HEAD:module"), first_);
+}
+
+TEST_F(MergedSubmodules, InConflictThatAreNotPopulatedStayOurs)
+{
+    diverge(moving(third_), moving(second_));
+    repository_.git({"submodule", "--quiet", "deinit", "--force", "module"});
+    expectConflicts("topic");
+    commit();
+    EXPECT_EQ(idOf("HEAD:module"), third_);
+}
+
+TEST_F(MergedSubmodules, ThatTheyRemovedLeaveTheIndexAndStayOnDisk)
+{
+    module_.write("untracked", "mine\n");
+    theyRemove(writing("ours", "x"));
+    expectAsGitBesideTheFolder();
+    EXPECT_EQ(repository_.line({"ls-tree", "--name-only", "HEAD", "module"}), "");
+    EXPECT_EQ(module_.read("untracked"), "mine\n");
+    EXPECT_EQ(module_.line({"rev-parse", "HEAD"}), first_);
+}
+
+TEST_F(MergedSubmodules, ThatTheyRemovedAreGoneBesideConflictsToo)
+{
+    theyRemove(writing("file", "ours\n"), "file");
+    expectAsGitBesideTheFolder();
+    EXPECT_THAT(conflicts(), ElementsAre("1 file", "2 file", "3 file"));
+    EXPECT_EQ(repository_.line({"ls-files", "module"}), "");
+    repository_.write("file", "both\n");
+    commit();
+    EXPECT_EQ(repository_.line({"ls-tree", "--name-only", "HEAD", "module"}), "");
+}
+
+TEST_F(MergedSubmodules, ThatTheyRemovedAndWeMovedAreInConflict)
+{
+    theyRemove(moving(third_));
+    expectAsGitBesideTheFolder();
+    EXPECT_THAT(conflicts(), ElementsAre("1 module", "2 module"));
+}
+
+TEST_F(MergedSubmodules, ThatWeRemovedAndTheyMovedAreInConflictBesideAnIgnoredFolder)
+{
+    makeBranch("topic", moving(second_));
+    removing()();
+    repository_.commit("on main");
+    repository_.write(".git/info/exclude", "/module\n");
+    expectAsGitBesideTheFolder();
+    EXPECT_THAT(conflicts(), ElementsAre("1 module", "3 module"));
+}
+
+/// As in a clone of git, where `git rm` has left the folder of a submodule with edits.
+TEST_F(MergedSubmodules, ThatWeRemovedAndTheyMovedAreTakenAsTheyAreCheckedOut)
+{
+    weRemoveAndTheyMove();
+    for (const std::string &id : {first_, second_, third_})
+    {
+        go(id);
+        expectCommitAsGit();
+        EXPECT_EQ(idOf("HEAD:module"), id);
+        repository_.git({"reset", "--quiet", "--hard", "main@{1}"});
+        expectConflicts("topic");
+    }
+}
+
+TEST_F(MergedSubmodules, ThatWeRemovedAndTheyMovedStayRemovedWithTheirFolder)
+{
+    weRemoveAndTheyMove();
+    repository_.remove("module");
+    expectCommitAsGit();
+    EXPECT_EQ(repository_.line({"ls-tree", "--name-only", "HEAD", "module"}), "");
+}
+
+/// git commits nothing then: it has no commit to take.
+TEST_F(MergedSubmodules, ThatWeRemovedAndTheyMovedStayRemovedWithoutARepository)
+{
+    weRemoveAndTheyMove();
+    repository_.remove("module");
+    repository_.write("module/mine", "mine\n");
+    EXPECT_FALSE(commitByGit(makeTwin()).succeeded());
+    commit();
+    EXPECT_EQ(repository_.line({"ls-tree", "--name-only", "HEAD", "module"}), "");
+    EXPECT_EQ(repository_.read("module/mine"), "mine\n");
+}
+
+/// All that they did; a later commit must not take the merge for one that was interrupted.
+TEST_F(MergedSubmodules, MayBeAllThatTheyRemoved)
+{
+    repository_.git({"checkout", "--quiet", "-b", "topic"});
+    repository_.git({"rm", "--quiet", "--cached", "module"});
+    repository_.commit("on topic");
+    repository_.git({"checkout", "--quiet", "--force", "main"});
+    writing("ours", "x")();
+    repository_.commitAll("on main");
+    expectAsGitBesideTheFolder();
+}
+
+TEST_F(MergedSubmodules, ComeToTheFolderThatABranchHasLeft)
+{
+    repository_.git({"checkout", "--quiet", "-b", "topic"});
+    go(second_);
+    repository_.commitAll("on topic");
+    leaveSubmodule();
+    module_.write("untracked", "mine\n");
+    ASSERT_THAT(status(), ElementsAre("?? module/"));
+    expectAsGitBesideTheFolder();
+    EXPECT_EQ(idOf("HEAD:module"), second_);
+    EXPECT_EQ(module_.read("untracked"), "mine\n");
+}
+
+/// Nothing tells the commit that is checked out in it.
+TEST_F(MergedSubmodules, ComeToARepositoryWithoutACommit)
+{
+    repository_.git({"branch", "topic"});
+    leaveSubmodule();
+    repository_.remove("module");
+    const auto empty = GitRepository::init(repository_ / "module");
+    empty.write("untracked", "mine\n");
+    expectAsGitBesideTheFolder();
+    EXPECT_EQ(idOf("HEAD:module"), first_);
+    EXPECT_EQ(empty.read("untracked"), "mine\n");
+}
+
+TEST_F(MergedSubmodules, DoNotHideWhatIsStagedInTheirFolder)
+{
+    repository_.git({"branch", "topic"});
+    leaveSubmodule();
+    repository_.remove("module");
+    repository_.write("module/staged", "mine\n");
+    repository_.add({"module/staged"});
+    EXPECT_THAT(failureOfMerge("topic"), testing::HasSubstr("would be overwritten by merge"));
+    EXPECT_THAT(status(), ElementsAre("A  module/staged"));
+}
+
+/// Has other entries in the index by the time of the merge's own commit.
+class LateEntriesAdapter : public vclink::git::GitAdapter
+{
+  public:
+    using GitAdapter::GitAdapter;
+
+    void commit(const upath &folder, const ustring &message) override
+    {
+        addEntries();
+        GitAdapter::commit(folder, message);
+    }
+
+    std::function<void()> addEntries;
+};
+
+/// libgit2 leaves such an entry where it could not write the file.
+TEST_F(MergedSubmodules, ThatNoParentHasAreNotInAMerge)
+{
+    theyMove(writing("ours", "x"));
+    LateEntriesAdapter adapter(
+        asPath(repository_.path()),
+        std::static_pointer_cast<vclink::ApplicationInteractor>(interactor_));
+    adapter.addEntries = [this]
+    {
+        for (const auto *name : {"nowhere", "other"})
+            repository_.git(
+                {"update-index", "--add", "--cacheinfo", "160000," + first_ + ',' + name});
+    };
+    vclink::git::BranchManager::create(adapter)->merge("topic");
+    EXPECT_EQ(repository_.git({"ls-tree", "--name-only", "HEAD", "nowhere"}), "");
+    EXPECT_EQ(repository_.git({"show", "HEAD:other"}), repository_.read("other"));
+    EXPECT_EQ(idOf("HEAD:module"), second_);
+}
+
+} // namespace

@@ -1,0 +1,350 @@
+// SPDX-License-Identifier: MIT
+// What becomes of operations when another process moves HEAD while they run. It needs no lock of
+// the index for that: `git commit` gives it up before its hooks and its editor.
+#include <filesystem>
+#include <functional>
+#include <memory>
+#include <string>
+#include <utility>
+#include <vector>
+
+#include <git2.h>
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include "LateCommit.hpp"
+#include "main/branches/BranchCallsFixture.hpp"
+#include "support/libgit2/LibGit2Recorder.hpp"
+#include "support/text.hpp"
+#include "util/repository/Head.hpp"
+
+namespace
+{
+
+namespace git = vclink::git;
+using testing::ElementsAre;
+using testing::HasSubstr;
+using testing::IsEmpty;
+using vclink::test::Failure;
+using vclink::test::failureOf;
+using vclink::test::LateCommit;
+using vclink::test::LibGit2Recorder;
+using vclink::test::splitLines;
+using vclink::test::stateOf;
+using vclink::test::textOf;
+
+class MovedHead : public vclink::test::BranchCallsFixture
+{
+  protected:
+    /// "topic" is ahead, with changes of each kind, or diverged.
+    void makeTopic(bool isDiverged)
+    {
+        makeBranch("topic",
+                   [this]
+                   {
+                       repository_.write("file", "theirs\n");
+                       repository_.remove("other");
+                       repository_.write("theirs", "x");
+                   });
+        if (isDiverged)
+        {
+            repository_.write("ours", "x");
+            repository_.commitAll("on main");
+        }
+    }
+    /// Has a new file staged that only the late commit has.
+    void beginLateCommit()
+    {
+        repository_.write("late", "late\n");
+        repository_.add({"late"});
+        late_ = std::make_unique<LateCommit>(repository_);
+    }
+    /// To be done once, in the midst of an operation.
+    void moveHead()
+    {
+        if (late_ != nullptr)
+        {
+            EXPECT_TRUE(std::exchange(late_, nullptr)->goOn());
+            moved_ = idOf("HEAD");
+        }
+    }
+    /// Everything is as git's commit has left it.
+    void expectUntouched() const
+    {
+        EXPECT_EQ(idOf("main"), moved_);
+        EXPECT_EQ(repository_.line({"log", "-1", "--format=%s", "main"}), "late");
+        EXPECT_EQ(currentBranch(), "refs/heads/main");
+        EXPECT_THAT(status(), IsEmpty());
+        EXPECT_EQ(branches().getRepositoryState(), "Normal");
+        EXPECT_EQ(repository_.read("late"), "late\n");
+        EXPECT_FALSE(exists(".git/vclink-merge"));
+        EXPECT_FALSE(exists(".git/index.lock"));
+    }
+    /// Expects that the late commit is in the working copy, the index and the branch.
+    void expectLateKept() const
+    {
+        EXPECT_EQ(repository_.read("late"), "late\n");
+        EXPECT_EQ(repository_.line({"ls-files", "late"}), "late");
+        EXPECT_EQ(repository_.git({"show", "main:late"}), "late\n");
+    }
+    bool exists(const std::string &name) const
+    {
+        return std::filesystem::exists(repository_ / name);
+    }
+    static std::string movedText()
+    {
+        return textOf(Failure{GIT_EMODIFIED, GIT_ERROR_REFERENCE, git::Head::movedText});
+    }
+    static std::string notCommittedText()
+    {
+        return textOf(Failure{GIT_EMODIFIED, GIT_ERROR_MERGE,
+                              "the merge was not committed, because another process has "
+                              "moved the current branch or ended the merge meanwhile: see "
+                              "git status"});
+    }
+    /// Calls the hook after the merge's lock is given up and before its commit takes another.
+    static void beforeTheCommit(LibGit2Recorder &calls, const std::function<void()> &hook)
+    {
+        calls.on<git_reference_dwim>(
+            [hook](git_reference **, git_repository *, const char *name)
+            {
+                if (name == std::string("topic"))
+                    hook();
+            });
+    }
+
+    std::unique_ptr<LateCommit> late_;
+    std::string moved_;
+};
+
+TEST_F(MovedHead, RefusesASwitchBeforeItWrites)
+{
+    makeTopic(false);
+    beginLateCommit();
+    LibGit2Recorder calls;
+    calls.on<git_checkout_tree>([this](auto...) { moveHead(); });
+    EXPECT_EQ(failureOf([this] { branches().switchBranch("topic"); }),
+              (Failure{GIT_EMODIFIED, GIT_ERROR_REFERENCE, git::Head::movedText}));
+    expectUntouched();
+    branches().switchBranch("topic");
+    EXPECT_EQ(currentBranch(), "refs/heads/topic");
+    EXPECT_FALSE(exists("late"));
+}
+
+TEST_F(MovedHead, RefusesAFastForwardBeforeItWrites)
+{
+    makeTopic(false);
+    beginLateCommit();
+    LibGit2Recorder calls;
+    calls.on<git_checkout_tree>([this](auto...) { moveHead(); });
+    EXPECT_EQ(failureOfMerge("topic"), movedText());
+    expectUntouched();
+    merge("topic");
+    expectLateKept();
+    EXPECT_THAT(parents(), ElementsAre(moved_, idOf("topic")));
+}
+
+TEST_F(MovedHead, RefusesAFastForwardOfABranchThatIsNoLongerTheCurrentOne)
+{
+    makeTopic(false);
+    moved_ = idOf("main");
+    repository_.git({"branch", "same"});
+    LibGit2Recorder calls;
+    calls.on<git_checkout_tree>(
+        [this](auto...) {
+            repository_.git({"symbolic-ref", "HEAD", "refs/heads/same"});
+        });
+    EXPECT_EQ(failureOfMerge("topic"), movedText());
+    EXPECT_EQ(idOf("main"), moved_);
+    EXPECT_THAT(status(), IsEmpty());
+}
+
+TEST_F(MovedHead, RefusesAFastForwardThatHasLookedAtAnotherCommit)
+{
+    makeTopic(false);
+    beginLateCommit();
+    LibGit2Recorder calls;
+    calls.on<git_object_lookup>([this](auto...) { moveHead(); });
+    EXPECT_EQ(failureOfMerge("topic"), movedText());
+    expectUntouched();
+}
+
+/// Deletions alone are told of by no notification.
+TEST_F(MovedHead, KeepsWhatWasCommittedSinceTheLookBeforeAFastForward)
+{
+    makeBranch("topic", [this] { repository_.remove("other"); });
+    beginLateCommit();
+    LibGit2Recorder calls;
+    calls.on<git_checkout_tree>([this](auto...) { moveHead(); });
+    EXPECT_NE(failureOfMerge("topic"), "");
+    EXPECT_EQ(idOf("main"), moved_);
+    expectLateKept();
+}
+
+TEST_F(MovedHead, KeepsWhatWasCommittedWhileAFastForwardWrote)
+{
+    makeTopic(false);
+    beginLateCommit();
+    LibGit2Recorder calls;
+    calls.on<git_reference_set_target>([this](auto...) { moveHead(); });
+    EXPECT_THAT(failureOfMerge("topic"), HasSubstr("old reference value does not match"));
+    EXPECT_EQ(idOf("main"), moved_);
+    expectLateKept();
+}
+
+TEST_F(MovedHead, RefusesAMergeBeforeItWrites)
+{
+    makeTopic(true);
+    beginLateCommit();
+    LibGit2Recorder calls;
+    calls.on<git_merge>([this](auto...) { moveHead(); });
+    EXPECT_EQ(failureOfMerge("topic"), movedText());
+    expectUntouched();
+    merge("topic");
+    expectLateKept();
+    EXPECT_THAT(parents(), ElementsAre(moved_, idOf("topic")));
+}
+
+/// libgit2 has read HEAD by then, to merge it, and reads it again to check and to write.
+TEST_F(MovedHead, RefusesAMergeWhileItsCommandsRun)
+{
+    repository_.write(".gitattributes", "driven merge=slow\n");
+    repository_.write("driven", "base\n");
+    repository_.commitAll("driven");
+    diverge(writing("driven", "ours\n"), writing("driven", "theirs\n"));
+    repository_.write("../slow",
+                      "cd '" + repository_.path().string() +
+                          "' && : >.git/hooks/commit-msg.go\nturn=0\n"
+                          "while [ \"$(git log -1 --format=%s)\" != late ] && [ $turn -lt 300 ]\n"
+                          "do sleep 0.05; turn=$((turn + 1)); done\n");
+    repository_.git({"config", "merge.slow.driver", "sh " + (folder() / "slow").string() + " %A"});
+    beginLateCommit();
+    EXPECT_EQ(failureOfMerge("topic"), movedText());
+    late_.reset();
+    moved_ = idOf("HEAD");
+    expectUntouched();
+    merge("topic");
+    expectLateKept();
+}
+
+TEST_F(MovedHead, LeavesAMergeToBeCommittedIfItMovesWhileThatIsWritten)
+{
+    makeTopic(true);
+    late_ = std::make_unique<LateCommit>(repository_);
+    LibGit2Recorder calls;
+    calls.answer<git_merge>(
+        [this](const auto &merge, auto... arguments)
+        {
+            const int code = merge(arguments...);
+            moveHead();
+            EXPECT_FALSE(exists(".git/MERGE_HEAD")) << "git has not ended the merge";
+            return code;
+        });
+    EXPECT_EQ(failureOfMerge("topic"), notCommittedText());
+    EXPECT_EQ(idOf("main"), moved_);
+    EXPECT_EQ(branches().getRepositoryState(), "Conflicts");
+    EXPECT_THAT(status(), ElementsAre("M  file", "D  other", "A  theirs"));
+    adapter_->commit(upath(), u"concluded");
+    EXPECT_THAT(parents(), ElementsAre(moved_, idOf("topic")));
+    EXPECT_THAT(status(), IsEmpty());
+}
+
+/// The last that a late commit does.
+TEST_F(MovedHead, IsNoneIfAnotherProcessOnlyRemovesTheMergeHead)
+{
+    makeTopic(true);
+    const std::string ours = idOf("main");
+    LibGit2Recorder calls;
+    calls.answer<git_merge>(
+        [this](const auto &merge, auto... arguments)
+        {
+            const int code = merge(arguments...);
+            repository_.remove(".git/MERGE_HEAD");
+            return code;
+        });
+    merge("topic");
+    EXPECT_THAT(parents(), ElementsAre(ours, idOf("topic")));
+}
+
+TEST_F(MovedHead, LeavesAMergeThatAnotherProcessHasCommitted)
+{
+    makeTopic(true);
+    const std::string ours = idOf("main");
+    LibGit2Recorder calls;
+    beforeTheCommit(calls,
+                    [this] {
+                        repository_.git({"commit", "--quiet", "--message", "of git"});
+                    });
+    EXPECT_EQ(failureOfMerge("topic"), notCommittedText());
+    EXPECT_THAT(parents(), ElementsAre(ours, idOf("topic")));
+    EXPECT_EQ(message(), "of git\n");
+    EXPECT_EQ(branches().getRepositoryState(), "Normal");
+}
+
+TEST_F(MovedHead, LeavesAMergeThatAnotherProcessHasTakenBack)
+{
+    makeTopic(true);
+    const auto before = stateOf(repository_);
+    LibGit2Recorder calls;
+    beforeTheCommit(calls, [this] { repository_.git({"merge", "--abort"}); });
+    EXPECT_EQ(failureOfMerge("topic"), notCommittedText());
+    const auto after = stateOf(repository_);
+    EXPECT_EQ(after.references, before.references);
+    EXPECT_EQ(after.index, before.index);
+    EXPECT_EQ(after.workingTree, before.workingTree);
+    EXPECT_EQ(branches().getRepositoryState(), "Normal");
+}
+
+TEST_F(MovedHead, LeavesAnotherMergeThatAnotherProcessHasBegun)
+{
+    makeTopic(true);
+    makeBranch("third", writing("third", "x"), "main^");
+    const std::string ours = idOf("main");
+    LibGit2Recorder calls;
+    beforeTheCommit(calls,
+                    [this]
+                    {
+                        repository_.git({"merge", "--abort"});
+                        repository_.git({"merge", "--quiet", "--no-commit", "third"});
+                    });
+    EXPECT_EQ(failureOfMerge("topic"), notCommittedText());
+    EXPECT_EQ(idOf("main"), ours);
+    EXPECT_EQ(idOf("MERGE_HEAD"), idOf("third"));
+}
+
+TEST_F(MovedHead, RefusesACommitThatWouldReplaceTheOther)
+{
+    repository_.write("file", "edited\n");
+    beginLateCommit();
+    LibGit2Recorder calls;
+    calls.on<git_commit_create>([this](auto...) { moveHead(); });
+    EXPECT_EQ(failureOf([this] { adapter_->commit(upath(), u"message"); }).code, GIT_EMODIFIED);
+    EXPECT_EQ(idOf("main"), moved_);
+    expectLateKept();
+    EXPECT_EQ(repository_.read("file"), "edited\n");
+}
+
+/// An adapter of the host's own, which commits twice at the end of a merge.
+class TwiceCommittingAdapter : public git::GitAdapter
+{
+  public:
+    using GitAdapter::GitAdapter;
+    void commit(const upath &path, const ustring &message) override
+    {
+        GitAdapter::commit(path, message);
+        GitAdapter::commit(path, u"and once more");
+    }
+};
+
+TEST_F(MovedHead, IsNoneIfTheAdaptersOwnCommitMovesIt)
+{
+    makeTopic(true);
+    TwiceCommittingAdapter adapter(
+        vclink::test::asPath(repository_.path()),
+        std::static_pointer_cast<vclink::ApplicationInteractor>(interactor_));
+    git::BranchManager::create(adapter)->merge("topic");
+    EXPECT_EQ(splitLines(repository_.git({"log", "--first-parent", "-3", "--format=%s"})),
+              (std::vector<std::string>{"and once more", "Merge branch 'topic'", "on main"}));
+}
+
+} // namespace

@@ -1,0 +1,394 @@
+// SPDX-License-Identifier: MIT
+#include <algorithm>
+#include <filesystem>
+#include <string>
+#include <vector>
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include "MergeFixture.hpp"
+#include "error/logging/severity.hpp"
+#include "support/LogCapture.hpp"
+
+namespace
+{
+
+namespace git = vclink::git;
+using testing::ElementsAre;
+using testing::IsEmpty;
+using vclink::test::LogCapture;
+
+constexpr const char *const prefix = "Conflicted entry is not mergeable: ";
+
+/// The texts of the records about files that must not hold markers.
+std::vector<std::string> unmergeableIn(const LogCapture &log)
+{
+    std::vector<std::string> paths;
+    for (const auto &message : log.messages(git::SeverityDiagnostic))
+    {
+        if (message.rfind(prefix, 0) == 0)
+            paths.push_back(message.substr(std::string(prefix).size()));
+    }
+    return paths;
+}
+
+/// How many checkouts ended.
+std::size_t checkoutsIn(const LogCapture &log)
+{
+    std::size_t count = 0;
+    for (const auto &message : log.messages(git::SeverityProgress))
+    {
+        if (message.rfind("Calls to chmod", 0) == 0)
+            ++count;
+    }
+    return count;
+}
+
+/// Files in conflict whose attributes say that they must not hold markers.
+class UnmergeableConflicts : public vclink::test::MergeFixture
+{
+  protected:
+    void attributes(const std::string &lines)
+    {
+        repository_.write(".gitattributes", lines);
+        repository_.commitAll("attributes");
+    }
+    /// Has each file changed on both sides.
+    void divergeIn(const std::vector<std::string> &names)
+    {
+        for (const auto &name : names)
+            repository_.write(name, "ancestor\n");
+        repository_.commitAll("ancestor");
+        diverge([&] { writeAll(names, "ours"); }, [&] { writeAll(names, "theirs"); });
+    }
+    void writeAll(const std::vector<std::string> &names, const std::string &side) const
+    {
+        for (const auto &name : names)
+            repository_.write(name, side + " of " + name + '\n');
+    }
+    bool isOurs(const std::string &name) const
+    {
+        return repository_.read(name) == "ours of " + name + '\n';
+    }
+    bool hasMarkers(const std::string &name) const
+    {
+        const std::string text = repository_.read(name);
+        return text.rfind("<<<<<<< HEAD\nours of " + name + "\n=======\ntheirs of " + name +
+                              "\n>>>>>>> ",
+                          0) == 0;
+    }
+    void expectStages(const std::string &name) const
+    {
+        const auto stages = vclink::test::splitLines(repository_.git(
+            {"--literal-pathspecs", "ls-files", "--unmerged", "--format=%(stage)", "--", name}));
+        EXPECT_THAT(stages, ElementsAre("1", "2", "3")) << name;
+    }
+};
+
+TEST_F(UnmergeableConflicts, AreNoneAmongTextFilesAndThereIsOneCheckout)
+{
+    divergeIn({"file"});
+    const LogCapture log(git::SeverityDiagnostic | git::SeverityProgress);
+    expectConflicts("topic");
+    EXPECT_TRUE(hasMarkers("file"));
+    EXPECT_THAT(unmergeableIn(log), IsEmpty());
+    EXPECT_EQ(checkoutsIn(log), 1U);
+}
+
+TEST_F(UnmergeableConflicts, WithTheMergeAttributeUnsetAreOurs)
+{
+    attributes("file -merge\n");
+    divergeIn({"file"});
+    const LogCapture log(git::SeverityDiagnostic | git::SeverityProgress);
+    expectConflicts("topic");
+    EXPECT_TRUE(isOurs("file"));
+    expectStages("file");
+    EXPECT_THAT(unmergeableIn(log), ElementsAre("file", "file", "file"));
+    EXPECT_EQ(checkoutsIn(log), 2U);
+}
+
+TEST_F(UnmergeableConflicts, ComeToTheSameAsInGit)
+{
+    attributes("file -merge\n");
+    divergeIn({"file", "text"});
+    expectAsGit();
+    EXPECT_TRUE(isOurs("file"));
+    EXPECT_TRUE(hasMarkers("text"));
+}
+
+TEST_F(UnmergeableConflicts, ThatAreNoTextAndNameADriverAreOurs)
+{
+    attributes("file -text merge=anything\n");
+    divergeIn({"file"});
+    const LogCapture log(git::SeverityDiagnostic | git::SeverityProgress);
+    expectConflicts("topic");
+    EXPECT_TRUE(isOurs("file"));
+    expectStages("file");
+    EXPECT_THAT(unmergeableIn(log), ElementsAre("file", "file", "file"));
+    EXPECT_EQ(checkoutsIn(log), 2U);
+}
+
+TEST_F(UnmergeableConflicts, OfADriverThatGaveUpAreOurs)
+{
+    attributes("file -text merge=refusing\n");
+    repository_.git({"config", "merge.refusing.driver", "false"});
+    divergeIn({"file"});
+    expectConflicts("topic");
+    EXPECT_TRUE(isOurs("file"));
+    expectStages("file");
+}
+
+struct AttributeCase
+{
+    std::string attributes;
+    bool isUnmergeable;
+};
+
+TEST_F(UnmergeableConflicts, AreTheseStatesOfTheTwoAttributesAndNoOthers)
+{
+    const std::vector<AttributeCase> cases{{"", false},
+                                           {"text", false},
+                                           {"-text", false},
+                                           {"text=auto", false},
+                                           {"merge", false},
+                                           {"merge text", false},
+                                           {"merge -text", false},
+                                           {"merge text=auto", false},
+                                           {"-merge", true},
+                                           {"-merge text", true},
+                                           {"-merge -text", true},
+                                           {"-merge text=auto", true},
+                                           {"merge=name", false},
+                                           {"merge=name text", false},
+                                           {"merge=name -text", true},
+                                           {"merge=name text=auto", false},
+                                           {"merge=text -text", true},
+                                           {"merge=binary", false},
+                                           {"merge=binary -text", true},
+                                           {"!merge", false},
+                                           {"!merge -text", false},
+                                           {"binary", true}};
+    std::string lines;
+    std::vector<std::string> names;
+    for (std::size_t i = 0; i < cases.size(); ++i)
+    {
+        names.push_back("case" + std::to_string(i));
+        lines += names.back() + ' ' + cases[i].attributes + '\n';
+    }
+    attributes(lines);
+    divergeIn(names);
+    const LogCapture log(git::SeverityDiagnostic);
+    expectConflicts("topic");
+    const auto unmergeable = unmergeableIn(log);
+    for (std::size_t i = 0; i < cases.size(); ++i)
+    {
+        const auto records = std::count(unmergeable.begin(), unmergeable.end(), names[i]);
+        EXPECT_EQ(records, cases[i].isUnmergeable ? 3 : 0) << cases[i].attributes;
+        EXPECT_EQ(isOurs(names[i]), cases[i].isUnmergeable) << cases[i].attributes;
+        expectStages(names[i]);
+    }
+}
+
+TEST_F(UnmergeableConflicts, ThatWeDeletedHaveTwoStages)
+{
+    attributes("file -merge\n");
+    diverge([this] { repository_.remove("file"); },
+            [this] { repository_.write("file", "theirs\n"); });
+    const LogCapture log(git::SeverityDiagnostic);
+    expectConflicts("topic");
+    EXPECT_THAT(unmergeableIn(log), ElementsAre("file", "file"));
+    EXPECT_THAT(conflicts(), ElementsAre("1 file", "3 file"));
+}
+
+TEST_F(UnmergeableConflicts, ThatTheyDeletedHaveTwoStagesAndAreOurs)
+{
+    attributes("file -merge\n");
+    diverge([this] { repository_.write("file", "ours\n"); },
+            [this] { repository_.remove("file"); });
+    const LogCapture log(git::SeverityDiagnostic);
+    expectConflicts("topic");
+    EXPECT_THAT(unmergeableIn(log), ElementsAre("file", "file"));
+    EXPECT_THAT(conflicts(), ElementsAre("1 file", "2 file"));
+    EXPECT_EQ(repository_.read("file"), "ours\n");
+}
+
+TEST_F(UnmergeableConflicts, ThatBothAddedHaveTwoStagesAndAreOurs)
+{
+    attributes("new -merge\n");
+    diverge([this] { repository_.write("new", "ours\n"); },
+            [this] { repository_.write("new", "theirs\n"); });
+    const LogCapture log(git::SeverityDiagnostic);
+    expectConflicts("topic");
+    EXPECT_THAT(unmergeableIn(log), ElementsAre("new", "new"));
+    EXPECT_EQ(repository_.read("new"), "ours\n");
+}
+
+TEST_F(UnmergeableConflicts, KeepOurMode)
+{
+    attributes("file -merge\n");
+    diverge(
+        [this]
+        {
+            repository_.write("file", "ours\n");
+            repository_.setMode("file", 0755);
+        },
+        [this] { repository_.write("file", "theirs\n"); });
+    expectConflicts("topic");
+    EXPECT_EQ(repository_.read("file"), "ours\n");
+    EXPECT_NE(std::filesystem::status(repository_ / "file").permissions() &
+                  std::filesystem::perms::owner_exec,
+              std::filesystem::perms::none);
+}
+
+TEST_F(UnmergeableConflicts, OfLinksAreOurs)
+{
+    attributes("* -merge\n");
+    const auto linking = [this](const std::string &target)
+    {
+        repository_.remove("file");
+        repository_.symlink(target, "file");
+    };
+    linking("ancestor");
+    repository_.commitAll("link");
+    diverge([&] { linking("ours"); }, [&] { linking("theirs"); });
+    expectConflicts("topic");
+    EXPECT_EQ(std::filesystem::read_symlink(repository_ / "file"), "ours");
+    expectStages("file");
+}
+
+/// libgit2 has put our file aside, and can't put it into the folder's place.
+TEST_F(UnmergeableConflicts, WithAFolderOfTheirsInTheirPlaceTellThatInPlaceOfTheConflict)
+{
+    attributes("new -merge\n");
+    diverge([this] { repository_.write("new", "ours\n"); },
+            [this] { repository_.write("new/inside", "theirs\n"); });
+    const std::string head = idOf("HEAD");
+    EXPECT_THAT(failureOfMerge("topic"), testing::HasSubstr("Is a directory"));
+    EXPECT_THAT(conflicts(), ElementsAre("2 new"));
+    EXPECT_EQ(repository_.read("new~HEAD"), "ours\n");
+    EXPECT_EQ(repository_.read("new/inside"), "theirs\n");
+    EXPECT_EQ(idOf("HEAD"), head);
+    EXPECT_EQ(branches().getRepositoryState(), "Conflicts");
+}
+
+TEST_F(UnmergeableConflicts, LeaveOtherFilesAlone)
+{
+    attributes("*.bin -merge\n");
+    divergeIn({"a.bin", "b.txt", "folder/c.bin", "folder/d.txt"});
+    repository_.write("untracked", "mine\n");
+    expectConflicts("topic");
+    EXPECT_TRUE(isOurs("a.bin"));
+    EXPECT_TRUE(isOurs("folder/c.bin"));
+    EXPECT_TRUE(hasMarkers("b.txt"));
+    EXPECT_TRUE(hasMarkers("folder/d.txt"));
+    EXPECT_EQ(repository_.read("untracked"), "mine\n");
+}
+
+/// The attributes of the merge's own result count, since the files are written by then.
+TEST_F(UnmergeableConflicts, FollowTheAttributesThatTheirSideBrings)
+{
+    diverge([this] { repository_.write("file", "ours\n"); },
+            [this]
+            {
+                repository_.write("file", "theirs\n");
+                repository_.write(".gitattributes", "file -merge\n");
+            });
+    expectConflicts("topic");
+    EXPECT_EQ(repository_.read("file"), "ours\n");
+}
+
+TEST_F(UnmergeableConflicts, FollowTheAttributesOfAFolder)
+{
+    repository_.write("folder/.gitattributes", "*.bin -merge\n");
+    divergeIn({"folder/a.bin", "a.bin"});
+    expectConflicts("topic");
+    EXPECT_TRUE(isOurs("folder/a.bin"));
+    EXPECT_TRUE(hasMarkers("a.bin"));
+}
+
+TEST_F(UnmergeableConflicts, FollowTheAttributesOfAFileThatIsNotTracked)
+{
+    divergeIn({"file"});
+    repository_.write(".gitattributes", "file -merge\n");
+    expectConflicts("topic");
+    EXPECT_TRUE(isOurs("file"));
+}
+
+TEST_F(UnmergeableConflicts, FollowTheAttributesOfTheRepositoryAlone)
+{
+    repository_.write(".git/info/attributes", "file -merge\n");
+    divergeIn({"file"});
+    expectConflicts("topic");
+    EXPECT_TRUE(isOurs("file"));
+}
+
+const std::vector<std::string> hardNames{
+    "#bin", "#",     "!bin",   "!",    "*",    "a*",      "?",      "a?",    "[",
+    "[ab]", "a[1]",  "[!a]",   "a b",  " a",   "a ",      "a  ",    " ",     "\t",
+    "a\t",  "a\nb",  "a\n",    "\n",   "a\vb", "a\f",     "a\r",    "\r",    "a\\b",
+    "\\",   "a\\",   "\\#bin", "\\*",  "\\[",  "caf\xE9", "\xFF",   "**",    "gr\xC3\xBC\xC3\x9F",
+    "a]",   "{a,b}", ":a",     "f/#b", "f/*",  "#f/b",    "f/a ",   "f */x", "f[1]/x",
+    "-a",   "a\\*",  "[a\\]",  "!*",   "[]",   "[^a]",    "a\r\nb", "\\!bin"};
+
+/// What the names would mean if they were taken for patterns or comments, or cut short.
+const std::vector<std::string> bystanders{"bin", "x",    "ab",   "a",    "aa", "a1",  "b",
+                                          "f/b", "f/xx", "f1/x", "f2/x", "1",  "a1b", "xyz"};
+
+/// The names are unmergeable, and the bystanders are in conflict as text.
+class UnmergeableNamesTogether : public UnmergeableConflicts
+{
+  protected:
+    void expectOnlyTheseOurs(const std::vector<std::string> &names)
+    {
+        std::string lines = "* -merge\n";
+        for (const auto &bystander : bystanders)
+            lines += '/' + bystander + " merge\n";
+        attributes(lines);
+        auto all = bystanders;
+        all.insert(all.end(), names.begin(), names.end());
+        divergeIn(all);
+        const LogCapture log(git::SeverityDiagnostic);
+        expectConflicts("topic");
+        EXPECT_EQ(unmergeableIn(log).size(), 3 * names.size());
+        for (const auto &name : names)
+        {
+            EXPECT_TRUE(isOurs(name)) << testing::PrintToString(name);
+            EXPECT_THAT(unmergeableIn(log), testing::Contains(name)) << "the plain name";
+            expectStages(name);
+        }
+        for (const auto &bystander : bystanders)
+            EXPECT_TRUE(hasMarkers(bystander)) << bystander;
+    }
+};
+
+class UnmergeableNames : public UnmergeableNamesTogether,
+                         public testing::WithParamInterface<std::string>
+{
+};
+
+TEST_P(UnmergeableNames, TouchNoOtherFileInConflict)
+{
+    expectOnlyTheseOurs({GetParam()});
+}
+
+INSTANTIATE_TEST_SUITE_P(OfEachKind, UnmergeableNames, testing::ValuesIn(hardNames),
+                         [](const auto &test) { return "Number" + std::to_string(test.index); });
+
+TEST_F(UnmergeableNamesTogether, OfAllKindsTouchNoOtherFileInConflict)
+{
+    expectOnlyTheseOurs(hardNames);
+}
+
+/// libgit2 looks only below what all patterns of a list begin with.
+TEST_F(UnmergeableNamesTogether, ThatAllBeginDangerouslyTouchNoOtherFileInConflict)
+{
+    expectOnlyTheseOurs({"#bin", "#c"});
+}
+
+TEST_F(UnmergeableNamesTogether, ThatAllNegateTouchNoOtherFileInConflict)
+{
+    expectOnlyTheseOurs({"!bin", "!a"});
+}
+
+} // namespace

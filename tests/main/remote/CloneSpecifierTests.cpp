@@ -1,0 +1,212 @@
+// SPDX-License-Identifier: MIT
+// What a clone is made of and where it goes.
+#include <filesystem>
+#include <memory>
+#include <string>
+#include <vector>
+
+#include <git2.h>
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include "CloneFixture.hpp"
+#include "error/logging/severity.hpp"
+#include "support/LogCapture.hpp"
+#include "support/UnprivilegedUser.hpp"
+#include "support/WorkingFolder.hpp"
+#include "support/libgit2Release.hpp"
+#include "vclink/git/LibGit2Exception.hpp"
+
+namespace
+{
+
+namespace git = vclink::git;
+using vclink::test::asUtf8;
+using vclink::test::GitRepository;
+using vclink::test::Naming;
+using vclink::test::WorkingFolder;
+
+const std::string eastern = "\xE6\x9D\xB1\xE4\xBA\xAC gr\xC3\xBC\xC3\x9F";
+
+class CloneSpecifier : public vclink::test::CloneFixture
+{
+  protected:
+    CloneSpecifier() : CloneFixture(Naming::PlainPath)
+    {
+    }
+
+    GitRepository serverNamed(const std::string &name) const
+    {
+        std::filesystem::copy(server_.path(), folder() / name,
+                              std::filesystem::copy_options::recursive);
+        return GitRepository(folder() / name);
+    }
+    /// Nothing is made then.
+    vclink::test::Failure failureOf(const std::string &specifier) const
+    {
+        auto failure = vclink::test::failureOf([&] { generate(specifier, clone_.path()); });
+        EXPECT_FALSE(std::filesystem::exists(clone_.path())) << specifier;
+        return failure;
+    }
+};
+
+class CloneTarget : public CloneSpecifier
+{
+  protected:
+    /// The names in the target, which stays a folder.
+    std::vector<std::string> names() const
+    {
+        std::vector<std::string> found;
+        for (const auto &entry : std::filesystem::directory_iterator(clone_.path()))
+            found.push_back(entry.path().filename());
+        return found;
+    }
+};
+
+TEST_F(CloneSpecifier, GoesToLibGit2AsUtf8)
+{
+    const auto server = serverNamed(eastern);
+    const vclink::test::LogCapture log(git::SeverityParameter);
+    generate(server.path(), folder() / ("clone " + eastern));
+    const GitRepository clone(folder() / ("clone " + eastern));
+    expectCloned(clone);
+    EXPECT_EQ(clone.line({"config", "remote.origin.url"}), server.path().string());
+    EXPECT_EQ(log.messages().front(), " repositorySpecifier=" + server.path().string() +
+                                          " sandboxRoot.string()=" + clone.path().string());
+}
+
+TEST_F(CloneSpecifier, MayHaveBlanksAndEscapesInAUrl)
+{
+    serverNamed("with blanks %25");
+    generate("file://" + (folder() / "with%20blanks%20%2525").string(), clone_.path());
+    expectCloned(clone_);
+}
+
+TEST_F(CloneSpecifier, MayBeRelativeToTheWorkingFolder)
+{
+    const WorkingFolder here(folder().path());
+    for (const std::string name : {"server", "./server", "author/../server", "author"})
+    {
+        generate(name, "relative/clone");
+        expectCloned(GitRepository(folder() / "relative/clone"));
+        std::filesystem::remove_all(folder() / "relative");
+    }
+}
+
+TEST_F(CloneSpecifier, MayNameTheFolderOfAWorkingCopy)
+{
+    generate(author_.path(), clone_.path());
+    expectCloned(clone_);
+}
+
+TEST_F(CloneSpecifier, OfAFolderThatIsNoRepositoryFails)
+{
+    std::filesystem::create_directory(folder() / "plain");
+    EXPECT_EQ(failureOf(folder() / "plain").code, GIT_ENOTFOUND);
+    EXPECT_LT(failureOf("file://" + (folder() / "plain").string()).code, 0);
+}
+
+TEST_F(CloneSpecifier, OfAFolderThatIsMissingFails)
+{
+    EXPECT_LT(failureOf(folder() / "missing").code, 0);
+    EXPECT_LT(failureOf("file://" + (folder() / "missing").string()).code, 0);
+}
+
+TEST_F(CloneSpecifier, ThatIsEmptyFails)
+{
+    const auto failure = failureOf("");
+    EXPECT_LT(failure.code, 0);
+    EXPECT_NE(failure.text, "");
+}
+
+TEST_F(CloneSpecifier, OfAnUnknownSchemeFails)
+{
+    EXPECT_THAT(
+        failureOf("nonsense://host/path").text,
+        testing::HasSubstr(vclink::test::libgit2Release::refusalOfScheme("nonsense://host/path")));
+}
+
+TEST_F(CloneSpecifier, ThatFailsLeavesTheGeneratorAsItWas)
+{
+    failureOf(folder() / "missing");
+    failureOf("");
+    generate();
+    expectCloned(clone_);
+}
+
+TEST_F(CloneTarget, MayBeAnEmptyFolder)
+{
+    std::filesystem::create_directory(clone_.path());
+    generate();
+    expectCloned(clone_);
+}
+
+TEST_F(CloneTarget, MayLieInFoldersThatAreMissing)
+{
+    generate(nameOf(server_), folder() / "a/b/c");
+    expectCloned(GitRepository(folder() / "a/b/c"));
+}
+
+TEST_F(CloneTarget, IsAFailureWhenItIsNotEmpty)
+{
+    std::filesystem::create_directory(clone_.path());
+    clone_.write("mine", "x");
+    const auto failure = vclink::test::failureOf([this] { generate(); });
+    EXPECT_EQ(failure.code, GIT_EEXISTS);
+    EXPECT_EQ(failure.errorClass, GIT_ERROR_INVALID);
+    EXPECT_EQ(failure.text,
+              "'" + clone_.path().string() + "' exists and is not an empty directory");
+    EXPECT_THAT(names(), testing::ElementsAre("mine"));
+    EXPECT_EQ(clone_.read("mine"), "x");
+}
+
+TEST_F(CloneTarget, IsAFailureWhenItIsAFile)
+{
+    GitRepository(folder().path()).write("clone", "x");
+    EXPECT_EQ(vclink::test::failureOf([this] { generate(); }).code, GIT_EEXISTS);
+    EXPECT_EQ(GitRepository(folder().path()).read("clone"), "x");
+}
+
+TEST_F(CloneTarget, ThatWasThereAndEmptyStaysSoAfterAFailure)
+{
+    std::filesystem::create_directory(clone_.path());
+    vclink::test::failureOf([this] { generate(folder() / "missing", clone_.path()); });
+    ASSERT_TRUE(std::filesystem::is_directory(clone_.path()));
+    EXPECT_THAT(names(), testing::IsEmpty());
+    generate();
+    expectCloned(clone_);
+}
+
+TEST_F(CloneTarget, WithAnEmptyNameFails)
+{
+    EXPECT_LT(vclink::test::failureOf([this] { generate(nameOf(server_), ""); }).code, 0);
+}
+
+TEST_F(CloneTarget, ThatMayNotBeWrittenFails)
+{
+    std::filesystem::create_directory(folder() / "closed");
+    std::filesystem::permissions(folder() / "closed", std::filesystem::perms(0555));
+    for (const auto &entered : {environment().home(), server_.path()})
+        std::filesystem::permissions(entered, std::filesystem::perms(0755));
+    const std::string outcome = vclink::test::runAsUnprivilegedUser(
+        [this]() -> std::string
+        {
+            try
+            {
+                const auto fresh = git::GitAdapterFactory().createWorkingCopyGenerator(interactor_);
+                fresh->generate(vclink::test::asUtf16("file://" + server_.path().string()),
+                                vclink::test::asPath((folder() / "closed/clone").string()));
+                return "cloned";
+            }
+            catch (const git::LibGit2Exception &exception)
+            {
+                const auto &error = exception.getError();
+                return std::to_string(error.getErrorClass()) + ' ' + asUtf8(error.getMessage());
+            }
+        });
+    EXPECT_THAT(outcome, testing::StartsWith(std::to_string(int{GIT_ERROR_OS}) + ' '));
+    EXPECT_THAT(outcome, testing::HasSubstr("Permission denied"));
+    EXPECT_TRUE(std::filesystem::is_empty(folder() / "closed"));
+}
+
+} // namespace

@@ -1,0 +1,242 @@
+// SPDX-License-Identifier: MIT
+#include <string>
+#include <vector>
+
+#include <git2.h>
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include "RemoteFixture.hpp"
+#include "error/logging/severity.hpp"
+#include "support/Descriptors.hpp"
+#include "support/LogCapture.hpp"
+
+namespace
+{
+
+namespace git = vclink::git;
+using testing::Contains;
+using testing::ElementsAre;
+using testing::HasSubstr;
+using testing::IsEmpty;
+using testing::StartsWith;
+using vclink::test::failureOf;
+using vclink::test::LogCapture;
+using vclink::test::Naming;
+using vclink::test::stateOf;
+
+class Fetch : public vclink::test::RemoteFixture, public testing::WithParamInterface<Naming>
+{
+  protected:
+    Fetch() : RemoteFixture(GetParam())
+    {
+    }
+
+    /// Fetches, and expects of the references what git makes of them.
+    void expectAsGitDoes(const std::vector<std::string> &refspecs = {}) const
+    {
+        const auto copy = twin();
+        std::vector<std::string> arguments{"fetch", "--quiet", "origin"};
+        arguments.insert(arguments.end(), refspecs.begin(), refspecs.end());
+        copy.git(arguments);
+        fetch(refspecs);
+        EXPECT_EQ(references(repository_), references(copy));
+        EXPECT_TRUE(repository_.tryGit({"fsck", "--full", "--strict"}).succeeded());
+    }
+    /// The author's annotated tag of what is checked out there.
+    void tagWithWords(const std::string &name)
+    {
+        author_.git({"-c", "user.name=A", "-c", "user.email=a@b", "tag", "-m", "words", name});
+    }
+    std::vector<std::string> remoteBranches() const
+    {
+        return vclink::test::splitLines(
+            repository_.git({"for-each-ref", "--format=%(refname:lstrip=3)", "refs/remotes"}));
+    }
+};
+
+TEST_P(Fetch, TakesANewBranch)
+{
+    expectAsGitDoes();
+    EXPECT_EQ(idOf("origin/main"), idOf("main", author_));
+    author_.git({"checkout", "--quiet", "-b", "feature/gr\xC3\xBC\xC3\x9F"});
+    publish("new", "x");
+    expectAsGitDoes();
+    EXPECT_THAT(remoteBranches(), ElementsAre("feature/gr\xC3\xBC\xC3\x9F", "main"));
+}
+
+TEST_P(Fetch, MovesABranch)
+{
+    fetch();
+    const std::string id = publish("file", "changed\n");
+    expectAsGitDoes();
+    EXPECT_EQ(idOf("origin/main"), id);
+}
+
+TEST_P(Fetch, MovesABranchThatWasRewritten)
+{
+    fetch();
+    author_.git({"checkout", "--quiet", "--orphan", "other"});
+    author_.git({"branch", "-D", "--quiet", "main"});
+    author_.git({"checkout", "--quiet", "--orphan", "main"});
+    const std::string id = publish("file", "from the beginning\n");
+    expectAsGitDoes();
+    EXPECT_EQ(idOf("origin/main"), id);
+}
+
+TEST_P(Fetch, KeepsABranchThatIsDeletedThere)
+{
+    author_.git({"push", "--quiet", "server", "main:gone"});
+    fetch();
+    server_.git({"update-ref", "-d", "refs/heads/gone"});
+    expectAsGitDoes();
+    EXPECT_THAT(remoteBranches(), ElementsAre("gone", "main"));
+}
+
+TEST_P(Fetch, DropsABranchThatIsDeletedThereWherePruningIsConfigured)
+{
+    author_.git({"push", "--quiet", "server", "main:gone"});
+    fetch();
+    server_.git({"update-ref", "-d", "refs/heads/gone"});
+    repository_.git({"config", "remote.origin.prune", "true"});
+    expectAsGitDoes();
+    EXPECT_THAT(remoteBranches(), ElementsAre("main"));
+}
+
+TEST_P(Fetch, TakesTagsOfWhatItTakes)
+{
+    author_.git({"tag", "light"});
+    tagWithWords("heavy");
+    author_.git({"push", "--quiet", "server", "--tags"});
+    expectAsGitDoes();
+    EXPECT_EQ(idOf("light"), idOf("main", author_));
+    EXPECT_EQ(idOf("heavy"), idOf("heavy", author_));
+}
+
+/// Within this machine libgit2 takes whatever references there are, which git does not.
+TEST_P(Fetch, TakesEveryTagOfARepositoryOnThisMachine)
+{
+    author_.git({"checkout", "--quiet", "--detach"});
+    author_.write("elsewhere", "x");
+    author_.commitAll("on no branch");
+    author_.git({"tag", "elsewhere"});
+    author_.git({"push", "--quiet", "server", "elsewhere"});
+    fetch();
+    EXPECT_EQ(idOf("elsewhere"), idOf("elsewhere", author_));
+}
+
+TEST_P(Fetch, TakesRefspecsAsTheyStand)
+{
+    const std::string id = publish("file", "changed\n");
+    author_.git({"push", "--quiet", "server", "main:gr\xC3\xBC\xC3\x9F"});
+    expectAsGitDoes({"+refs/heads/gr\xC3\xBC\xC3\x9F:refs/heads/\xE6\x9D\xB1",
+                     "refs/heads/main:refs/own/main"});
+    EXPECT_EQ(idOf("refs/heads/\xE6\x9D\xB1"), id);
+    EXPECT_EQ(idOf("refs/own/main"), id);
+}
+
+TEST_P(Fetch, OfAnEmptyListTakesWhatIsConfigured)
+{
+    author_.git({"push", "--quiet", "server", "main:other"});
+    repository_.git({"config", "remote.origin.fetch", "+refs/heads/other:refs/own/other"});
+    expectAsGitDoes();
+    EXPECT_EQ(idOf("refs/own/other"), idOf("main", author_));
+    EXPECT_THAT(remoteBranches(), IsEmpty());
+}
+
+TEST_P(Fetch, RefusesARefspecThatIsNone)
+{
+    const vclink::test::NothingChanges nothing(repository_);
+    EXPECT_LT(failureOf([this] { fetch({"refs/heads/*:refs/own/main"}); }).code, 0);
+}
+
+TEST_P(Fetch, OfNothingNewChangesNothing)
+{
+    fetch();
+    const auto before = stateOf(repository_);
+    fetch();
+    EXPECT_EQ(stateOf(repository_), before);
+}
+
+TEST_P(Fetch, LeavesBranchesAndFilesAsTheyAre)
+{
+    commit("own", "x");
+    repository_.write("own", "edited");
+    repository_.write("untracked", "x");
+    const auto before = stateOf(repository_);
+    fetch();
+    auto after = stateOf(repository_);
+    EXPECT_NE(after.references, before.references);
+    after.references = before.references;
+    EXPECT_EQ(after, before);
+}
+
+TEST_P(Fetch, OfAnEmptyRemoteTakesNothing)
+{
+    server_.git({"update-ref", "-d", "refs/heads/main"});
+    fetch();
+    EXPECT_THAT(references(repository_), IsEmpty());
+}
+
+TEST_P(Fetch, TellsEachReferenceThatItMoves)
+{
+    author_.git({"push", "--quiet", "server", "main:other"});
+    const LogCapture log(git::SeverityParameter);
+    fetch();
+    const auto messages = log.messages();
+    EXPECT_THAT(messages, Contains(" ref=refs/remotes/origin/main"));
+    EXPECT_THAT(messages, Contains(" ref=refs/remotes/origin/other"));
+}
+
+TEST_P(Fetch, TellsItsTransfer)
+{
+    const LogCapture log(git::SeverityProgress);
+    fetch();
+    EXPECT_THAT(log.messages(), Contains(StartsWith("Transfer Progress (Objects / Bytes): 3")));
+    EXPECT_TRUE(interactor_->progress.calls.empty());
+}
+
+TEST_P(Fetch, LogsNoFailureOfItsOwn)
+{
+    const LogCapture log(git::SeverityDiagnostic | git::SeverityException);
+    fetch();
+    EXPECT_THAT(log.messages(), IsEmpty());
+}
+
+/// The reflog of the reference holds libgit2's own words.
+TEST_P(Fetch, LeavesTheReflogToLibGit2)
+{
+    fetch();
+    EXPECT_THAT(repository_.git({"reflog", "show", "refs/remotes/origin/main"}),
+                HasSubstr("fetch"));
+}
+
+TEST_P(Fetch, ThatFailsLeavesTheRepositoryAsItWas)
+{
+    fetch();
+    publish("file", "changed\n");
+    repository_.write(".git/refs/remotes/origin/main.lock", "");
+    const auto before = stateOf(repository_);
+    EXPECT_THAT(failureOf([this] { fetch(); }).text, HasSubstr("main.lock"));
+    EXPECT_EQ(stateOf(repository_), before);
+    repository_.remove(".git/refs/remotes/origin/main.lock");
+    expectAsGitDoes();
+}
+
+TEST_P(Fetch, LeavesNoDescriptorOpen)
+{
+    fetch();
+    const vclink::test::NoDescriptorLeak noLeak;
+    publish("file", "changed\n");
+    fetch();
+    interactor_->cancel();
+    publish("file", "changed again\n");
+    if (GetParam() == Naming::FileUrl)
+        vclink::test::expectCancelled([this] { fetch(); });
+    repository_.git({"remote", "set-url", "origin", (folder() / "nowhere").string()});
+    failureOf([this] { fetch(); });
+}
+
+INSTANTIATE_TEST_SUITE_P(Locally, Fetch, testing::Values(Naming::PlainPath, Naming::FileUrl));
+
+} // namespace

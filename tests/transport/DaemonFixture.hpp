@@ -1,0 +1,49 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <memory>
+#include <string>
+
+#include "GitDaemon.hpp"
+#include "RemoteFixture.hpp"
+
+namespace vclink::test
+{
+
+/// Has the daemon of the suite running before the test's environment is made.
+class RunningDaemon
+{
+  protected:
+    RunningDaemon();
+
+    static GitDaemon &server();
+    static void stopServer();
+};
+
+/// Base of the fixtures that need one real server. A repository with files that take a while to
+/// transfer stands on it.
+class DaemonFixture : public RunningDaemon, public RemoteFixture
+{
+  protected:
+    static constexpr int fileCount = 100;
+    /// What a clone transfers at least; the files hold noise, which can't be packed.
+    static constexpr std::size_t size = 1'000'000;
+
+    DaemonFixture();
+    static void TearDownTestSuite();
+
+    /// The repository's address at another port.
+    std::string urlAt(std::uint16_t port) const;
+    /// Writes the files with other noise into a working copy, and commits them.
+    /// @return the id of the commit
+    static std::string commitNoise(GitRepository &repository, unsigned seed,
+                                   std::size_t bytes = size);
+    std::string servedId(const std::string &reference) const;
+
+    GitRepository served_ = server().makeRepository();
+    std::string url_ = server().url(served_);
+    GitRepository source_ = makeRepository("source");
+    std::string commit_;
+};
+
+} // namespace vclink::test

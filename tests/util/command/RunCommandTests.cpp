@@ -1,0 +1,208 @@
+// SPDX-License-Identifier: MIT
+#include <cerrno>
+#include <csignal>
+#include <cstdlib>
+#include <filesystem>
+#include <set>
+#include <sstream>
+#include <string>
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include "RunCommandFixture.hpp"
+#include "support/Descriptors.hpp"
+#include "support/WorkingFolder.hpp"
+
+namespace
+{
+
+using testing::ElementsAre;
+using vclink::test::Scripts;
+using vclink::test::WorkingFolder;
+
+class RunCommand : public vclink::test::RunCommandFixture
+{
+};
+
+TEST_F(RunCommand, GivesTheExitStatus)
+{
+    for (const int status : {0, 1, 2, 13, 126, 127, 128, 255})
+        EXPECT_EQ(resultOf(scripts_.shell("exit " + std::to_string(status))), status);
+}
+
+TEST_F(RunCommand, GivesTheNumberOfTheSignal)
+{
+    // None that nohup(1) would have ignored.
+    for (const int signal : {SIGUSR1, SIGKILL, SIGTERM})
+        EXPECT_EQ(resultOf(scripts_.shell("kill -" + std::to_string(signal) + " $$")), signal);
+}
+
+TEST_F(RunCommand, GivesTheSameNumberForASignalAndAnExitStatus)
+{
+    EXPECT_EQ(resultOf(scripts_.shell("kill -13 $$")), 13);
+    EXPECT_EQ(resultOf(scripts_.shell("exit 13")), 13);
+}
+
+TEST_F(RunCommand, RunsACommandWithoutPlaceholdersAsItStands)
+{
+    EXPECT_THAT(wordsOf("%T %A 100% %"), ElementsAre("%A", "100%", "%"));
+}
+
+TEST_F(RunCommand, ReplacesThePlaceholdersOfTheTemplate)
+{
+    const std::string program = scripts_.shell("test \"$*\" = 'o a b a 7 sub/f'");
+    EXPECT_EQ(resultOf(program + " %O %A %B %A %L %P",
+                       {{"%O", "o"}, {"%A", "a"}, {"%B", "b"}, {"%L", "7"}, {"%P", "sub/f"}}),
+              0);
+}
+
+TEST_F(RunCommand, SplitsAValueThatHoldsABlank)
+{
+    const std::string program = scripts_.shell("test $# = 3 && test \"$2\" = b");
+    EXPECT_EQ(resultOf(program + " %A c", {{"%A", "a b"}}), 0);
+}
+
+TEST_F(RunCommand, SplitsAtBlanksOutsideDoubleQuotesOnly)
+{
+    EXPECT_THAT(wordsOf("%T a \"b c\" d"), ElementsAre("a", "b c", "d"));
+    EXPECT_THAT(wordsOf("  %T   a    b  "), ElementsAre("a", "b"));
+    EXPECT_THAT(wordsOf("%T a\tb c"), ElementsAre("a\tb", "c"));
+    EXPECT_THAT(wordsOf("%T \"a  b"), ElementsAre("\"a  b"));
+}
+
+TEST_F(RunCommand, StripsOnePairOfQuotesAroundAWord)
+{
+    EXPECT_THAT(wordsOf("%T \"a\" \"\" \"\"b\"\""), ElementsAre("a", "", "\"b\""));
+    EXPECT_THAT(wordsOf("%T a\"b c\"d x\"y"), ElementsAre("a\"b c\"d", "x\"y"));
+    EXPECT_THAT(wordsOf("%T \\\"a\\\""), ElementsAre("\"a\""));
+}
+
+TEST_F(RunCommand, TakesOtherCharactersOfAShellAsTheyAre)
+{
+    EXPECT_THAT(wordsOf("%T 'a b' \\x $HOME * ; > out `id` | cat && ~ # end"),
+                ElementsAre("'a", "b'", "\\x", "$HOME", "*", ";", ">", "out", "`id`", "|", "cat",
+                            "&&", "~", "#", "end"));
+}
+
+TEST_F(RunCommand, KeepsATrailingLineFeedInTheLastWord)
+{
+    EXPECT_THAT(wordsOf("%T a b\n"), ElementsAre("a", "b\n"));
+}
+
+TEST_F(RunCommand, HandsBytesOverAsTheyAre)
+{
+    EXPECT_THAT(wordsOf("%T \xC3\xA9 \xFF\x01"), ElementsAre("\xC3\xA9", "\xFF\x01"));
+}
+
+TEST_F(RunCommand, StartsALauncherInQuotesWhosePathHasABlank)
+{
+    const std::filesystem::path launcher = folder() / "a b" / "tool";
+    std::filesystem::create_directories(launcher.parent_path());
+    std::filesystem::copy(scripts_.shell("test \"$*\" = x"), launcher);
+    EXPECT_EQ(resultOf("\"" + launcher.string() + "\" x"), 0);
+}
+
+TEST_F(RunCommand, RunsInTheWorkingFolderOfTheProcess)
+{
+    const WorkingFolder there(folder().path());
+    EXPECT_EQ(outputOf("pwd"), folder().path().string());
+}
+
+TEST_F(RunCommand, HandsTheWholeEnvironmentOver)
+{
+    ::setenv("VCLINK_TEST_VARIABLE", "a b\"c", 1);
+    const std::string out = folder() / "environment";
+    EXPECT_EQ(resultOf(scripts_.shell("env -0 | sort -z >" + out)), 0);
+    const std::string bytes = Scripts::read(out);
+    for (char **variable = environ; *variable != nullptr; ++variable)
+    {
+        const std::string text = *variable;
+        const std::string name = text.substr(0, text.find('='));
+        if (name != "_" && name != "PWD" && name != "OLDPWD" && name != "SHLVL")
+        {
+            EXPECT_NE(bytes.find(text + '\0'), std::string::npos) << text;
+        }
+    }
+}
+
+TEST_F(RunCommand, HandsStandardInputOver)
+{
+    EXPECT_EQ(outputOf("readlink /proc/self/fd/0"),
+              std::filesystem::read_symlink("/proc/self/fd/0").string());
+}
+
+TEST_F(RunCommand, GivesTheCommandItsOutputAndNoOtherPipe)
+{
+    const std::string out = folder() / "descriptors";
+    const std::string program = scripts_.shell(
+        "for number in /proc/$$/fd/*; do readlink $number; done >" + out + "; exit 0");
+    std::set<std::string> before;
+    for (const auto &descriptor : vclink::test::openDescriptors())
+        before.insert(descriptor.second);
+    EXPECT_EQ(resultOf(program), 0);
+    std::set<std::string> pipes;
+    std::istringstream lines(Scripts::read(out));
+    for (std::string line; std::getline(lines, line);)
+    {
+        if (line.compare(0, 5, "pipe:") == 0 && before.count(line) == 0)
+            pipes.insert(line);
+    }
+    EXPECT_EQ(pipes.size(), 1U);
+}
+
+TEST_F(RunCommand, DropsStandardError)
+{
+    testing::internal::CaptureStderr();
+    const std::string output = outputOf("echo lost >&2; echo kept");
+    EXPECT_EQ(testing::internal::GetCapturedStderr(), "");
+    EXPECT_EQ(output, "kept");
+}
+
+TEST_F(RunCommand, LosesStandardErrorAtEveryLoggingLevel)
+{
+    // The record of the command names the script, not what it prints.
+    const std::string program = scripts_.shell("cat >&2 <<END\nlost\nEND\n" + waitUntilRead());
+    std::vector<unsigned> masks{0, vclink::test::LogCapture::allSeverities};
+    for (unsigned bit = 1; bit != 0; bit <<= 1)
+        masks.push_back(bit);
+    for (const unsigned mask : masks)
+    {
+        const vclink::test::LogCapture log(mask);
+        testing::internal::CaptureStdout();
+        testing::internal::CaptureStderr();
+        EXPECT_EQ(resultOf(program), 0);
+        EXPECT_EQ(testing::internal::GetCapturedStderr(), "") << mask;
+        EXPECT_EQ(testing::internal::GetCapturedStdout(), "") << mask;
+        for (const std::string &message : log.messages())
+            EXPECT_EQ(message.find("lost"), std::string::npos) << mask << ": " << message;
+    }
+}
+
+TEST_F(RunCommand, TellsOfTheExpandedCommandAndItsOutput)
+{
+    const std::string program = scripts_.shell("echo one; echo two\n" + waitUntilRead());
+    EXPECT_THAT(recordsOf(program + " \"x\" y"),
+                ElementsAre("Command: " + program + " \"x\" y", "Output:\nonetwo"));
+}
+
+TEST_F(RunCommand, TellsOfASilentCommandToo)
+{
+    const std::string program = scripts_.shell("exit 7");
+    EXPECT_THAT(recordsOf(program), ElementsAre("Command: " + program, "Output:\n"));
+}
+
+TEST_F(RunCommand, TellsOfACommandThatCannotBeStarted)
+{
+    EXPECT_THAT(recordsOf("/nowhere/tool x"), ElementsAre("Command: /nowhere/tool x"));
+    EXPECT_THAT(recordsOf(""), ElementsAre("Command: "));
+}
+
+TEST_F(RunCommand, ReadsOutputOfManyPipesFull)
+{
+    const std::string out =
+        outputOf("dd if=/dev/zero bs=1000 count=1000 2>/dev/null | tr '\\0' x; echo");
+    EXPECT_EQ(out.size(), 1'000'000U);
+}
+
+} // namespace
