@@ -18,6 +18,7 @@
 namespace
 {
 
+using computils::exception::StackTraceRecordingException;
 using foundation::core::except::Exception;
 using foundation::core::except::IException;
 using foundation::core::except::IMsgIDException;
@@ -55,22 +56,17 @@ class OtherWords : public TagException
     }
 };
 
-} // namespace
+template <class Derived, class... Bases>
+constexpr bool derives = (std::is_base_of_v<Bases, Derived> && ...);
+static_assert(derives<TagException, IMsgIDException, SourceControlException>);
+static_assert(derives<IMsgIDException, boost::exception, IUserException>);
+static_assert(derives<IUserException, IException>);
+static_assert(derives<SourceControlException, StackTraceRecordingException>);
+static_assert(derives<StackTraceRecordingException, std::exception>);
+static_assert(
+    derives<vclink::util::exception::CancelledOperationException, StackTraceRecordingException>);
 
-TEST(Exceptions, HaveTheirBases)
-{
-    EXPECT_TRUE((std::is_base_of_v<IMsgIDException, TagException>));
-    EXPECT_TRUE((std::is_base_of_v<SourceControlException, TagException>));
-    EXPECT_TRUE((std::is_base_of_v<boost::exception, IMsgIDException>));
-    EXPECT_TRUE((std::is_base_of_v<IUserException, IMsgIDException>));
-    EXPECT_TRUE((std::is_base_of_v<IException, IUserException>));
-    EXPECT_TRUE((std::is_base_of_v<computils::exception::StackTraceRecordingException,
-                                   SourceControlException>));
-    EXPECT_TRUE(
-        (std::is_base_of_v<std::exception, computils::exception::StackTraceRecordingException>));
-    EXPECT_TRUE((std::is_base_of_v<computils::exception::StackTraceRecordingException,
-                                   vclink::util::exception::CancelledOperationException>));
-}
+} // namespace
 
 TEST(Exceptions, TellTheirIdentifier)
 {
@@ -101,18 +97,16 @@ TEST(Exceptions, TellTheTextThatADerivedClassGives)
     EXPECT_STREQ(static_cast<const std::exception &>(exception).what(), "other words");
 }
 
-TEST(Exceptions, AreClonedWithAllTheyHold)
+TEST(Exceptions, AreClonedAndRethrownAsTheirOwnClassWithAllTheyHold)
 {
     const TagException exception = makeException();
-    const std::unique_ptr<const TagException> copy(exception.clone());
-    EXPECT_EQ(copy->GetID(), exception.GetID());
-    EXPECT_EQ(copy->GetUnicodeMessageTxt(), exception.GetUnicodeMessageTxt());
-    EXPECT_NE(&copy->GetBaseMsgIDObj(), &exception.GetBaseMsgIDObj());
-}
-
-TEST(Exceptions, AreRethrownAsTheirOwnClass)
-{
-    const TagException exception = makeException();
+    const auto expectCopy = [&exception](const TagException &copy)
+    {
+        EXPECT_EQ(copy.GetID(), exception.GetID());
+        EXPECT_EQ(copy.GetUnicodeMessageTxt(), exception.GetUnicodeMessageTxt());
+        EXPECT_NE(&copy.GetBaseMsgIDObj(), &exception.GetBaseMsgIDObj());
+    };
+    expectCopy(*std::unique_ptr<const TagException>(exception.clone()));
     const boost::exception_detail::clone_base &base = exception;
     try
     {
@@ -121,8 +115,7 @@ TEST(Exceptions, AreRethrownAsTheirOwnClass)
     }
     catch (const TagException &copy)
     {
-        EXPECT_NE(&copy, &exception);
-        EXPECT_EQ(copy.GetID(), exception.GetID());
+        expectCopy(copy);
     }
 }
 

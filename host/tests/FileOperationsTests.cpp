@@ -1,72 +1,60 @@
 // SPDX-License-Identifier: MIT
+#include <filesystem>
 #include <set>
 #include <string>
 
 #include <gtest/gtest.h>
-#include <sys/stat.h>
-#include <unistd.h>
 
 #include "fl/filesystem/operations.hpp"
-#include "fl/i18n/convert.hpp"
-#include "support/TemporaryFolder.hpp"
+#include "support/Files.hpp"
 
 using fl::i18n::ustring_to_utf8;
 using vclink_host_tests::ScopedVariable;
-using vclink_host_tests::TemporaryFolder;
-using vclink_host_tests::writeFile;
 
-TEST(FileOperations, TellWhetherSomethingExists)
+namespace
 {
-    const TemporaryFolder folder;
-    writeFile(folder.file("file"), "");
-    EXPECT_TRUE(fl::filesystem::exists(upath(folder.ufile("file"))));
-    EXPECT_TRUE(fl::filesystem::exists(upath(folder.ufile(""))));
-    EXPECT_FALSE(fl::filesystem::exists(upath(folder.ufile("missing"))));
-    EXPECT_FALSE(fl::filesystem::exists(upath(folder.ufile("file/below"))));
+
+class FileOperations : public testing::Test
+{
+  protected:
+    const vclink_host_tests::Folder folder;
+};
+
+TEST_F(FileOperations, TellWhetherSomethingExistsAndRemoveAFile)
+{
+    folder.write("file", "");
+    EXPECT_TRUE(fl::filesystem::exists(folder("file")));
+    EXPECT_TRUE(fl::filesystem::exists(folder("")));
+    EXPECT_FALSE(fl::filesystem::exists(folder("missing")));
+    EXPECT_FALSE(fl::filesystem::exists(folder("file/below")));
+    EXPECT_TRUE(fl::filesystem::remove(folder("file")));
+    EXPECT_FALSE(fl::filesystem::exists(folder("file")));
 }
 
-TEST(FileOperations, RemoveAFile)
+TEST_F(FileOperations, RaiseWhenSomethingCannotBeRemoved)
 {
-    const TemporaryFolder folder;
-    writeFile(folder.file("file"), "");
-    EXPECT_TRUE(fl::filesystem::remove(upath(folder.ufile("file"))));
-    EXPECT_FALSE(fl::filesystem::exists(upath(folder.ufile("file"))));
+    std::filesystem::create_directory(folder / "full");
+    folder.write("full/file", "");
+    EXPECT_THROW(fl::filesystem::remove(folder("full")), std::exception);
+    EXPECT_TRUE(fl::filesystem::exists(folder("full/file")));
 }
 
-TEST(FileOperations, RaiseWhenSomethingCannotBeRemoved)
+TEST_F(FileOperations, NameTemporaryFilesInTheSystemsFolderAndNeverTwoAlike)
 {
-    const TemporaryFolder folder;
-    ASSERT_EQ(::mkdir(folder.file("full").c_str(), 0700), 0);
-    writeFile(folder.file("full/file"), "");
-    EXPECT_THROW(fl::filesystem::remove(upath(folder.ufile("full"))), std::exception);
-    EXPECT_TRUE(fl::filesystem::exists(upath(folder.ufile("full/file"))));
-}
-
-TEST(FileOperations, NameTemporaryFilesInTheSystemsFolder)
-{
-    const TemporaryFolder folder;
-    const ScopedVariable variable("TMPDIR", folder.path().c_str());
-    const std::string name = ustring_to_utf8(fl::filesystem::tmpnam(u"", u"", u""));
-    EXPECT_EQ(name.substr(0, name.rfind('/')), folder.path());
-    EXPECT_GT(name.size(), folder.path().size() + 1);
-}
-
-TEST(FileOperations, NeverNameTwoTemporaryFilesAlike)
-{
-    const TemporaryFolder folder;
     const ScopedVariable variable("TMPDIR", folder.path().c_str());
     std::set<ustring> names;
     for (int round = 0; round < 200; ++round)
-    {
         EXPECT_TRUE(names.insert(fl::filesystem::tmpnam(u"", u"", u"")).second);
-    }
+    const std::filesystem::path name = ustring_to_utf8(*names.begin());
+    EXPECT_EQ(name.parent_path(), folder.path());
+    EXPECT_NE(name.filename(), "");
 }
 
-TEST(FileOperations, KnowWhereTheHostIsInstalled)
+TEST_F(FileOperations, KnowWhereTheHostIsInstalled)
 {
-    const std::string path = ustring_to_utf8(fl::filesystem::get_install_path());
-    ASSERT_FALSE(path.empty());
-    EXPECT_EQ(path.front(), '/');
-    struct stat status = {};
-    EXPECT_EQ(::stat(path.c_str(), &status), 0) << path;
+    const std::filesystem::path path = ustring_to_utf8(fl::filesystem::get_install_path());
+    EXPECT_TRUE(path.is_absolute());
+    EXPECT_TRUE(std::filesystem::exists(path)) << path;
 }
+
+} // namespace

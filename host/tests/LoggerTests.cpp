@@ -1,52 +1,92 @@
 // SPDX-License-Identifier: MIT
 #include <string>
 #include <thread>
+#include <tuple>
+#include <vector>
 
+#include <boost/log/attributes/value_extraction.hpp>
+#include <boost/log/core.hpp>
+#include <boost/log/sinks/basic_sink_backend.hpp>
+#include <boost/log/sinks/sync_frontend.hpp>
+#include <boost/smart_ptr/make_shared_object.hpp>
+#include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include "foundation/core/log/basic_diagnostic_logger.hpp"
-#include "support/LogRecorder.hpp"
 
 namespace
 {
 
-using Logger = foundation::core::log::basic_diagnostic_logger<char>;
-using vclink_host_tests::LoggingSwitchedOff;
-using vclink_host_tests::LogRecorder;
+namespace logging = boost::log;
+using DiagnosticLogger = foundation::core::log::basic_diagnostic_logger<char>;
+using testing::ElementsAre;
+using testing::IsEmpty;
+using testing::SizeIs;
 
 constexpr unsigned parameter = 0x02;
 constexpr unsigned diagnostic = 0x08;
 
-/// A write as the logger's users make it: the bit, the core, the record, and only then the text.
-/// @return whether the text was built
-bool write(Logger &logger, unsigned severity, const std::string &text)
-{
-    if (!logger.is_enabled(severity) || !logger.is_logging_enabled())
-    {
-        return false;
-    }
-    auto record = logger.open_record(severity);
-    if (!record)
-    {
-        return false;
-    }
-    logger.push_record(std::move(record), text);
-    return true;
-}
+/// Severity, channel and message of a record, as a sink of Boost.Log gets them.
+using Record = std::tuple<unsigned, std::string, std::string>;
 
-} // namespace
-
-TEST(Logger, HasNothingEnabledAtTheStart)
+class Recording : public logging::sinks::basic_sink_backend<logging::sinks::synchronized_feeding>
 {
-    Logger logger("tests.start");
-    EXPECT_EQ(logger.name(), "tests.start");
+  public:
+    void consume(const logging::record_view &record)
+    {
+        // extract() gives an empty reference, and get() asserts, for a value of another type.
+        records.emplace_back(logging::extract<unsigned>("Severity", record).get(),
+                             logging::extract<std::string>("Channel", record).get(),
+                             logging::extract<std::string>("Message", record).get());
+    }
+
+    std::vector<Record> records;
+};
+
+class Logger : public testing::Test
+{
+  protected:
+    Logger()
+    {
+        logging::core::get()->add_sink(sink_);
+    }
+    ~Logger() override
+    {
+        logging::core::get()->set_logging_enabled(true);
+        logging::core::get()->remove_sink(sink_);
+    }
+
+    /// A write as the logger's users make it: the bit, the core, the record, and only then the
+    /// text.
+    /// @return whether the text was built
+    bool write(unsigned severity, const std::string &text)
+    {
+        if (!logger.is_enabled(severity) || !logger.is_logging_enabled())
+            return false;
+        auto record = logger.open_record(severity);
+        if (!record)
+            return false;
+        logger.push_record(std::move(record), text);
+        return true;
+    }
+    const std::vector<Record> &records() const
+    {
+        return backend_->records;
+    }
+
+    DiagnosticLogger logger{"tests"};
+
+  private:
+    boost::shared_ptr<Recording> backend_ = boost::make_shared<Recording>();
+    boost::shared_ptr<logging::sinks::synchronous_sink<Recording>> sink_ =
+        boost::make_shared<logging::sinks::synchronous_sink<Recording>>(backend_);
+};
+
+TEST_F(Logger, HasNothingEnabledAtTheStartAndEachBitOnItsOwnLater)
+{
+    EXPECT_EQ(logger.name(), "tests");
     EXPECT_EQ(logger.enabled_severities(), 0U);
     EXPECT_FALSE(logger.is_enabled(~0U));
-}
-
-TEST(Logger, EnablesEachBitOnItsOwn)
-{
-    Logger logger("tests.bits");
     logger.set_enabled_severities(parameter | 0x200);
     EXPECT_EQ(logger.enabled_severities(), 0x202U);
     EXPECT_TRUE(logger.is_enabled(parameter));
@@ -56,94 +96,58 @@ TEST(Logger, EnablesEachBitOnItsOwn)
     EXPECT_FALSE(logger.is_enabled(parameter));
 }
 
-TEST(Logger, HandsTheSinksSeverityChannelAndMessage)
+TEST_F(Logger, HandsTheSinksSeverityChannelAndMessage)
 {
-    const LogRecorder recorder;
-    Logger logger("tests.record");
     logger.set_enabled_severities(parameter | diagnostic);
-    EXPECT_TRUE(write(logger, diagnostic, "caf\xC3\xA9 \xFF"));
-    EXPECT_TRUE(write(logger, parameter, ""));
-    ASSERT_EQ(recorder.records().size(), 2U);
-    EXPECT_EQ(recorder.records()[0].severity, diagnostic);
-    EXPECT_EQ(recorder.records()[0].channel, "tests.record");
-    EXPECT_EQ(recorder.records()[0].message, "caf\xC3\xA9 \xFF");
-    EXPECT_EQ(recorder.records()[1].severity, parameter);
-    EXPECT_EQ(recorder.records()[1].message, "");
+    EXPECT_TRUE(write(diagnostic, "caf\xC3\xA9 \xFF"));
+    EXPECT_TRUE(write(parameter, ""));
+    EXPECT_THAT(records(), ElementsAre(Record(diagnostic, "tests", "caf\xC3\xA9 \xFF"),
+                                       Record(parameter, "tests", "")));
 }
 
-TEST(Logger, WritesNothingOfADisabledSeverity)
+TEST_F(Logger, WritesNothingThatIsDisabledSwitchedOffOrNotPushed)
 {
-    const LogRecorder recorder;
-    Logger logger("tests.disabled");
     logger.set_enabled_severities(diagnostic);
-    EXPECT_FALSE(write(logger, parameter, "text"));
-    EXPECT_TRUE(recorder.records().empty());
-}
-
-TEST(Logger, WritesNothingWhenTheCoreIsSwitchedOff)
-{
-    const LogRecorder recorder;
-    Logger logger("tests.off");
-    logger.set_enabled_severities(diagnostic);
+    EXPECT_FALSE(write(parameter, "disabled"));
     EXPECT_TRUE(logger.is_logging_enabled());
-    {
-        const LoggingSwitchedOff off;
-        EXPECT_FALSE(logger.is_logging_enabled());
-        EXPECT_FALSE(static_cast<bool>(logger.open_record(diagnostic)));
-        EXPECT_FALSE(write(logger, diagnostic, "text"));
-    }
-    EXPECT_TRUE(write(logger, diagnostic, "text"));
-    EXPECT_EQ(recorder.records().size(), 1U);
+    logging::core::get()->set_logging_enabled(false);
+    EXPECT_FALSE(logger.is_logging_enabled());
+    EXPECT_FALSE(static_cast<bool>(logger.open_record(diagnostic)));
+    EXPECT_FALSE(write(diagnostic, "switched off"));
+    logging::core::get()->set_logging_enabled(true);
+    EXPECT_TRUE(static_cast<bool>(logger.open_record(diagnostic)));
+    EXPECT_THAT(records(), IsEmpty());
+    EXPECT_TRUE(write(diagnostic, "text"));
+    EXPECT_THAT(records(), SizeIs(1));
 }
 
-TEST(Logger, DropsARecordThatIsNotPushed)
+TEST_F(Logger, CountsTheScopesOfEachThreadApart)
 {
-    const LogRecorder recorder;
-    Logger logger("tests.dropped");
-    {
-        const auto record = logger.open_record(diagnostic);
-        EXPECT_TRUE(static_cast<bool>(record));
-    }
-    EXPECT_TRUE(recorder.records().empty());
-}
-
-TEST(Logger, CountsTheScopesOfEachThreadApart)
-{
-    Logger logger("tests.depth");
-    Logger other("tests.depth.other");
+    DiagnosticLogger other("tests.other");
     EXPECT_EQ(logger.scope_depth(), 0);
-    ++logger.scope_depth();
-    ++logger.scope_depth();
+    logger.scope_depth() += 2;
     EXPECT_EQ(logger.scope_depth(), 2);
     EXPECT_EQ(other.scope_depth(), 0);
     int depthThere = -1;
-    std::thread thread(
-        [&logger, &depthThere]
-        {
-            depthThere = logger.scope_depth();
-            ++logger.scope_depth();
-        });
-    thread.join();
+    std::thread([&] { depthThere = logger.scope_depth()++; }).join();
     EXPECT_EQ(depthThere, 0);
     EXPECT_EQ(logger.scope_depth(), 2);
 }
 
-TEST(Logger, IsWrittenByManyThreadsAtOnce)
+TEST_F(Logger, IsWrittenByManyThreadsAtOnce)
 {
     constexpr int rounds = 200;
-    const LogRecorder recorder;
-    Logger logger("tests.threads");
     logger.set_enabled_severities(diagnostic);
-    const auto writeMany = [&logger]
+    const auto writeMany = [this]
     {
         for (int round = 0; round < rounds; ++round)
-        {
-            write(logger, diagnostic, "text");
-        }
+            write(diagnostic, "text");
     };
     std::thread one(writeMany);
     std::thread two(writeMany);
     one.join();
     two.join();
-    EXPECT_EQ(recorder.records().size(), 2U * rounds);
+    EXPECT_THAT(records(), SizeIs(2 * rounds));
 }
+
+} // namespace

@@ -21,30 +21,31 @@ bool isLess(const ustring &left, const ustring &right)
 
 } // namespace
 
-TEST(PathOrder, PutsALeadingPartFirst)
+TEST(PathOrder, ComparesElementsAndTheirUnitsNotTextsAndCodePoints)
 {
-    EXPECT_TRUE(isLess(u"/a", u"/a/b"));
-    EXPECT_FALSE(isLess(u"/a/b", u"/a"));
-    EXPECT_TRUE(isLess(u"", u"a"));
-    EXPECT_TRUE(isLess(u"", u"/"));
-    EXPECT_TRUE(isLess(u"/", u"/a"));
-    EXPECT_FALSE(isLess(u"/a", u"/a"));
-}
-
-TEST(PathOrder, ComparesElementsNotTexts)
-{
-    // As texts, '-' sorts before '/'.
-    EXPECT_TRUE(isLess(u"a/x", u"a-b/x"));
-    EXPECT_FALSE(isLess(u"a-b/x", u"a/x"));
-    EXPECT_TRUE(isLess(u"a/b/c", u"a.b"));
-    EXPECT_TRUE(isLess(u"/r/a", u"/r/a b"));
-}
-
-TEST(PathOrder, ComparesUnitsNotCodePoints)
-{
-    // U+1F600 begins with the unit D83D, which is below U+FF01.
-    EXPECT_TRUE(isLess(u"/\U0001F600", u"/\uFF01"));
-    EXPECT_FALSE(isLess(u"/\uFF01", u"/\U0001F600"));
+    const struct
+    {
+        const char16_t *first;
+        const char16_t *second;
+    } rows[] = {
+        // A leading part comes first.
+        {u"/a", u"/a/b"},
+        {u"", u"a"},
+        {u"", u"/"},
+        {u"/", u"/a"},
+        // As texts, '-' sorts before '/'.
+        {u"a/x", u"a-b/x"},
+        {u"a/b/c", u"a.b"},
+        {u"/r/a", u"/r/a b"},
+        // U+1F600 begins with the unit D83D, which is below U+FF01.
+        {u"/\U0001F600", u"/\uFF01"},
+    };
+    for (const auto &row : rows)
+    {
+        EXPECT_TRUE(isLess(row.first, row.second)) << to_string(row.second);
+        EXPECT_FALSE(isLess(row.second, row.first)) << to_string(row.second);
+        EXPECT_FALSE(isLess(row.first, row.first)) << to_string(row.first);
+    }
 }
 
 TEST(PathOrder, TakesNoNoticeOfTheNativeForm)
@@ -63,9 +64,7 @@ TEST(PathOrder, AgreesWithTheWalkOverTheElements)
     };
     std::vector<Walked> walked;
     for (const ustring &text : makeRandomPaths(1, 1000))
-    {
         walked.push_back({upath(text), listElements(text)});
-    }
     const auto less = vclink::FileStateMap().key_comp();
     for (const Walked &left : walked)
     {

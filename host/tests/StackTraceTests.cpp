@@ -17,6 +17,9 @@ namespace
 using computils::exception::StackTraceRecordingException;
 using foundation::core::diag::stacktrace_base;
 
+static_assert(stacktrace_base::capacity == 128 && sizeof(stacktrace_base) >= 128 * sizeof(void *) &&
+              sizeof(StackTraceRecordingException) >= sizeof(stacktrace_base));
+
 constexpr std::uintptr_t longestFunction = 4096;
 
 const void *returnAddress = nullptr;
@@ -33,9 +36,7 @@ std::optional<std::size_t> findFrame(const stacktrace_base &trace, const void *a
     for (std::size_t index = 0; index < trace.size(); ++index)
     {
         if (trace.frame(index) == address)
-        {
             return index;
-        }
     }
     return std::nullopt;
 }
@@ -44,13 +45,9 @@ std::optional<std::size_t> findFrame(const stacktrace_base &trace, const void *a
 {
     stacktrace_base trace;
     if (depth > 0)
-    {
         trace = captureAtDepth(depth - 1);
-    }
     else
-    {
         trace.capture(0);
-    }
     return trace;
 }
 
@@ -76,14 +73,7 @@ TEST(StackTrace, HoldsTheFramesOfTheRaisingCode)
     }
 }
 
-TEST(StackTrace, IsHeldInline)
-{
-    EXPECT_EQ(stacktrace_base::capacity, 128U);
-    EXPECT_GE(sizeof(stacktrace_base), 128 * sizeof(void *));
-    EXPECT_GE(sizeof(StackTraceRecordingException), sizeof(stacktrace_base));
-}
-
-TEST(StackTrace, IsCopiedWithItsException)
+TEST(StackTrace, IsCopiedWithItsExceptionWhichHasNoTextOfItsOwn)
 {
     const StackTraceRecordingException exception;
     const auto copy = std::make_unique<StackTraceRecordingException>(exception);
@@ -91,9 +81,8 @@ TEST(StackTrace, IsCopiedWithItsException)
     ASSERT_GT(original.size(), 0U);
     ASSERT_EQ(copy->getStackTrace().size(), original.size());
     for (std::size_t index = 0; index < original.size(); ++index)
-    {
         EXPECT_EQ(copy->getStackTrace().frame(index), original.frame(index));
-    }
+    EXPECT_EQ(exception.getText(), ustring());
 }
 
 TEST(StackTrace, LeavesOutWhatIsDeeperThanItsCapacity)
@@ -113,15 +102,11 @@ TEST(StackTrace, SkipsTheInnermostFramesOnRequest)
     EXPECT_EQ(rest.frame(0), whole.frame(1));
 }
 
-TEST(StackTrace, IsEmptyBeforeItIsTaken)
-{
-    EXPECT_EQ(stacktrace_base().size(), 0U);
-    EXPECT_EQ(stacktrace_base().to_text(), ustring());
-}
-
-TEST(StackTrace, HasALineForEachFrame)
+TEST(StackTrace, IsEmptyBeforeItIsTakenAndThenHasALineForEachFrame)
 {
     stacktrace_base trace;
+    EXPECT_EQ(trace.size(), 0U);
+    EXPECT_EQ(trace.to_text(), ustring());
     trace.capture(0);
     const ustring text = trace.to_text();
     EXPECT_EQ(static_cast<std::size_t>(std::count(text.begin(), text.end(), u'\n')) + 1,
@@ -139,9 +124,4 @@ TEST(StackTrace, IsReportedOutsideAndInsideAHandler)
     {
         EXPECT_FALSE(computils::exception::getStackTraceReport().empty());
     }
-}
-
-TEST(StackTrace, BelongsToAnExceptionWithoutATextOfItsOwn)
-{
-    EXPECT_EQ(StackTraceRecordingException().getText(), ustring());
 }

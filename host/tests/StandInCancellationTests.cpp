@@ -13,44 +13,38 @@ using vclink::PollableTerminator;
 using vclink::Terminator;
 using vclink_host::requestCancellation;
 
-TEST(StandInCancellation, IsRememberedUntilItIsPolled)
+namespace
 {
-    Terminator source;
-    PollableTerminator poller(source);
-    requestCancellation(source);
-    requestCancellation(source);
-    EXPECT_TRUE(poller.checkAndResetCancelledState());
+
+/// The first poll, and the one after it.
+void expectPolls(PollableTerminator &poller, bool first)
+{
+    EXPECT_EQ(poller.checkAndResetCancelledState(), first);
     EXPECT_FALSE(poller.checkAndResetCancelledState());
-    requestCancellation(source);
-    EXPECT_TRUE(poller.checkAndResetCancelledState());
 }
 
-TEST(StandInCancellation, IsRememberedByEachPollerForItself)
+TEST(StandInCancellation, IsRememberedUntilItIsPolledByEachPollerForItself)
 {
     Terminator source;
     PollableTerminator one(source);
     PollableTerminator two(source);
     requestCancellation(source);
-    EXPECT_TRUE(one.checkAndResetCancelledState());
-    EXPECT_FALSE(one.checkAndResetCancelledState());
-    EXPECT_TRUE(two.checkAndResetCancelledState());
-}
-
-TEST(StandInCancellation, IsNotRememberedByAPollerThatComesLater)
-{
-    Terminator source;
     requestCancellation(source);
-    PollableTerminator poller(source);
-    EXPECT_FALSE(poller.checkAndResetCancelledState());
+    expectPolls(one, true);
+    expectPolls(two, true);
+    requestCancellation(source);
+    expectPolls(one, true);
 }
 
-TEST(StandInCancellation, OfOneSourceIsNotSeenAtAnother)
+TEST(StandInCancellation, IsNotRememberedByAPollerThatComesLaterOrIsOfAnotherSource)
 {
     Terminator source;
     Terminator other;
-    PollableTerminator poller(other);
+    PollableTerminator ofOther(other);
     requestCancellation(source);
-    EXPECT_FALSE(poller.checkAndResetCancelledState());
+    PollableTerminator later(source);
+    expectPolls(ofOther, false);
+    expectPolls(later, false);
 }
 
 TEST(StandInCancellation, OutlivesItsSource)
@@ -61,19 +55,19 @@ TEST(StandInCancellation, OutlivesItsSource)
     requestCancellation(*source);
     EXPECT_TRUE(untold.checkAndResetCancelledState());
     source.reset();
-    EXPECT_TRUE(told.checkAndResetCancelledState());
-    EXPECT_FALSE(untold.checkAndResetCancelledState());
+    expectPolls(told, true);
+    expectPolls(untold, false);
 }
 
 TEST(StandInCancellation, IsAskedForWithoutAPoller)
 {
     Terminator source;
     {
-        PollableTerminator gone(source);
+        const PollableTerminator gone(source);
     }
     requestCancellation(source);
     PollableTerminator poller(source);
-    EXPECT_FALSE(poller.checkAndResetCancelledState());
+    expectPolls(poller, false);
 }
 
 TEST(StandInCancellation, IsSeenWhenAnotherThreadAsks)
@@ -84,9 +78,7 @@ TEST(StandInCancellation, IsSeenWhenAnotherThreadAsks)
     const auto limit = std::chrono::steady_clock::now() + std::chrono::seconds(30);
     bool isSeen = false;
     while (!isSeen && std::chrono::steady_clock::now() < limit)
-    {
         isSeen = poller.checkAndResetCancelledState();
-    }
     asking.join();
     EXPECT_TRUE(isSeen);
 }
@@ -99,17 +91,14 @@ TEST(StandInCancellation, IsAskedForWhilePollersComeAndGo)
         [&source, &isDone]
         {
             while (!isDone)
-            {
                 requestCancellation(source);
-            }
         });
     for (int round = 0; round < 500; ++round)
-    {
-        PollableTerminator poller(source);
-        poller.checkAndResetCancelledState();
-    }
+        PollableTerminator(source).checkAndResetCancelledState();
     isDone = true;
     asking.join();
     PollableTerminator poller(source);
-    EXPECT_FALSE(poller.checkAndResetCancelledState());
+    expectPolls(poller, false);
 }
+
+} // namespace

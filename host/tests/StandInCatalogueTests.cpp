@@ -1,24 +1,25 @@
 // SPDX-License-Identifier: MIT
 #include <atomic>
 #include <cstdlib>
+#include <filesystem>
 #include <thread>
 
-#include <boost/filesystem/operations.hpp>
 #include <gtest/gtest.h>
 
 #include "fl/i18n/MessageCatalog.hpp"
 #include "fl/i18n/convert.hpp"
+#include "support/Files.hpp"
 #include "support/Keys.hpp"
-#include "support/TemporaryFolder.hpp"
+#include "support/LocaleOfTheProcess.hpp"
 #include "vclink_host/locale.hpp"
 
 using fl::i18n::to_string;
 using fl::i18n::VkLocale;
 using resource_core::BaseMsgID;
 using vclink_host_tests::catalogue;
+using vclink_host_tests::Folder;
 using vclink_host_tests::makeAllMessages;
 using vclink_host_tests::ScopedVariable;
-using vclink_host_tests::TemporaryFolder;
 
 namespace
 {
@@ -39,25 +40,19 @@ std::string getText(const char *key, const std::string &locale)
 class StandInCatalogue : public testing::Test
 {
   public:
-    StandInCatalogue() : locale_(VkLocale::global())
-    {
-    }
     ~StandInCatalogue() override
     {
-        vclink_host::setGlobalLocale(locale_);
         vclink_host::setCatalogueFolder(installedCatalogues);
     }
 
   private:
-    VkLocale locale_;
+    const vclink::test::LocaleOfTheProcess locale_{VkLocale::global().name()};
 };
 
 void appendNumber(std::string &bytes, std::size_t number)
 {
     for (int shift = 0; shift < 32; shift += 8)
-    {
         bytes += static_cast<char>((number >> shift) & 0xFFU);
-    }
 }
 
 /// A compiled catalogue, as gettext's manual lays it out, that translates one message.
@@ -71,9 +66,7 @@ std::string makeCompiledCatalogue(const std::string &original, const std::string
     std::string bytes;
     for (const std::size_t number : {std::size_t(0x950412DE), std::size_t(0), std::size_t(2),
                                      tables, tables + 2 * entry, std::size_t(0), strings})
-    {
         appendNumber(bytes, number);
-    }
     std::string texts;
     for (const std::string &text : {std::string(), original, header, translation})
     {
@@ -85,10 +78,10 @@ std::string makeCompiledCatalogue(const std::string &original, const std::string
 }
 
 /// Puts a catalogue for the language "xx" into the folder, and makes the folder the one in use.
-void useCatalogue(const TemporaryFolder &folder, const std::string &content)
+void useCatalogue(const Folder &folder, const std::string &content)
 {
-    boost::filesystem::create_directories(folder.file("xx/LC_MESSAGES"));
-    vclink_host_tests::writeFile(folder.file("xx/LC_MESSAGES/vclink_git.mo"), content);
+    std::filesystem::create_directories(folder / "xx/LC_MESSAGES");
+    folder.write("xx/LC_MESSAGES/vclink_git.mo", content);
     vclink_host::setCatalogueFolder(folder.path());
 }
 
@@ -125,9 +118,7 @@ TEST_F(StandInCatalogue, SpeaksPlainEnglishByDefault)
     for (std::size_t index = 0; index < messages.size(); ++index)
     {
         for (const char *locale : {"", "C", "C.UTF-8", "POSIX", "en_GB.UTF-8", "xx_YY", "../de"})
-        {
             EXPECT_EQ(getText(messages[index], locale), texts[index]) << locale;
-        }
     }
 }
 
@@ -154,6 +145,8 @@ TEST_F(StandInCatalogue, PutsTheArgumentsWhereTheLanguageWantsThem)
 {
     EXPECT_EQ(getText(makeCheckoutMessage("a/b"), "de"), "a/b wird ausgecheckt");
     EXPECT_EQ(getText(makeCheckoutMessage("a/b"), "ja"), "a/b をチェックアウトしています");
+    EXPECT_EQ(getText("NoFilesToRemove", "ja"),
+              "削除するファイルがありません。何も変更されていません。");
 }
 
 TEST_F(StandInCatalogue, LooksOnlyAtLanguageAndCountry)
@@ -161,9 +154,7 @@ TEST_F(StandInCatalogue, LooksOnlyAtLanguageAndCountry)
     const std::string german = getText("NoFilesToRemove", "de");
     EXPECT_EQ(german, "Es gibt keine Dateien zu entfernen. Es wurde nichts geändert.");
     for (const char *locale : {"de_AT", "de_DE.ISO-8859-1", "de_DE@euro", "de.UTF-8"})
-    {
         EXPECT_EQ(getText("NoFilesToRemove", locale), german) << locale;
-    }
 }
 
 TEST_F(StandInCatalogue, KeepsBytesOfFileNamesThatAreNotUtf8)
@@ -176,28 +167,18 @@ TEST_F(StandInCatalogue, KeepsBytesOfFileNamesThatAreNotUtf8)
               u"Checking out " + units);
 }
 
-TEST_F(StandInCatalogue, GivesTheWordsOfAMessageThatItDoesNotKnow)
+TEST_F(StandInCatalogue, GivesTheWordsOfAMessageThatItDoesNotKnowAndLeavesOutMissingArguments)
 {
     EXPECT_EQ(getText("NoSuchKey", "de"), "shared_vclink:git:NoSuchKey");
     const BaseMsgID other({7L, std::string("two"), ustring(u"three")}, "other", "NoFilesToRemove");
     EXPECT_EQ(getText(other, "de"), "other:NoFilesToRemove (7, two, three)");
-}
-
-TEST_F(StandInCatalogue, LeavesOutArgumentsThatAreMissing)
-{
     EXPECT_EQ(getText(BaseMsgID({1L}, catalogue, "LibGit2Error"), "C"),
               "Git could not complete the operation:  (code 1, category )");
 }
 
-TEST_F(StandInCatalogue, FindsItsFilesUnderTheInstallation)
-{
-    EXPECT_EQ(getText("NoFilesToRemove", "ja"),
-              "削除するファイルがありません。何も変更されていません。");
-}
-
 TEST_F(StandInCatalogue, TakesTheFolderThatTheHostSets)
 {
-    const TemporaryFolder folder;
+    const Folder folder;
     useCatalogue(folder, makeCompiledCatalogue(checkoutKey, "%1%, of all things"));
     EXPECT_EQ(getText(makeCheckoutMessage("file"), "xx"), "file, of all things");
     EXPECT_EQ(getText(makeCheckoutMessage("file"), "de"), "Checking out file");
@@ -209,11 +190,10 @@ TEST_F(StandInCatalogue, TakesTheFolderThatTheHostSets)
 
 TEST_F(StandInCatalogue, TakesNoPathForALanguage)
 {
-    const TemporaryFolder folder;
+    const Folder folder;
     useCatalogue(folder, makeCompiledCatalogue(checkoutKey, "translated"));
-    boost::filesystem::rename(folder.file("xx"), folder.file("yy"));
-    boost::filesystem::create_directory(folder.file("sub"));
-    boost::filesystem::rename(folder.file("yy"), folder.file("sub/yy"));
+    std::filesystem::create_directory(folder / "sub");
+    std::filesystem::rename(folder / "xx", folder / "sub/yy");
     EXPECT_EQ(getText(makeCheckoutMessage("file"), "sub/yy"), "Checking out file");
     vclink_host::setCatalogueFolder(folder.file("sub"));
     EXPECT_EQ(getText(makeCheckoutMessage("file"), "yy"), "translated");
@@ -235,14 +215,14 @@ TEST_F(StandInCatalogue, NeverRaisesForABrokenPlaceholder)
     };
     for (const auto &row : rows)
     {
-        const TemporaryFolder folder;
+        const Folder folder;
         useCatalogue(folder, makeCompiledCatalogue(checkoutKey, row.translation));
         EXPECT_EQ(getText(makeCheckoutMessage("file"), "xx"), row.text) << row.translation;
     }
     for (const char *translation :
          {"%", "%%%", "%|", "%|1$", "%1$", "%-", "%1%%", "%s %d %n", "%0%"})
     {
-        const TemporaryFolder folder;
+        const Folder folder;
         useCatalogue(folder, makeCompiledCatalogue(checkoutKey, translation));
         EXPECT_NO_THROW(getText(makeCheckoutMessage("file"), "xx")) << translation;
     }
@@ -254,7 +234,7 @@ TEST_F(StandInCatalogue, SpeaksEnglishWhenItsFileIsBroken)
     for (const std::string &content : {std::string(), std::string("no catalogue"),
                                        whole.substr(0, 20), std::string(4096, '\xFF')})
     {
-        const TemporaryFolder folder;
+        const Folder folder;
         useCatalogue(folder, content);
         EXPECT_EQ(getText(makeCheckoutMessage("file"), "xx"), "Checking out file");
     }

@@ -6,9 +6,9 @@
 
 #include "foundation/core/except/Exception.hpp"
 #include "support/Keys.hpp"
+#include "support/LocaleOfTheProcess.hpp"
 #include "vclink/exception/SourceControlException.hpp"
 #include "vclink/util/exception/CancelledOperationException.hpp"
-#include "vclink_host/locale.hpp"
 
 namespace stand_in_exceptions
 {
@@ -64,23 +64,22 @@ TEST(StandInExceptions, SayTheirClassWhenTheyHaveNoText)
     EXPECT_TRUE(noexcept(Plain().what()));
 }
 
-TEST(StandInExceptions, JoinCatalogueAndKeyInTheirIdentifier)
+TEST(StandInExceptions, NameCatalogueAndKeyAndProduceTheirTextWhenTheyAreAskedForIt)
 {
-    EXPECT_EQ(TagException(Tag(), SourceControlException()).GetID(),
-              "shared_vclink:git:NoFilesToRemove");
-}
-
-TEST(StandInExceptions, ProduceTheirTextWhenTheyAreAskedForIt)
-{
-    const fl::i18n::VkLocale before = fl::i18n::VkLocale::global();
     const TagException exception{Tag(), SourceControlException()};
-    vclink_host::setGlobalLocale(fl::i18n::VkLocale("C"));
-    EXPECT_STREQ(exception.what(), "There are no files to remove. Nothing was changed.");
-    vclink_host::setGlobalLocale(fl::i18n::VkLocale("de_DE.UTF-8"));
-    EXPECT_STREQ(exception.what(), "Es gibt keine Dateien zu entfernen. Es wurde nichts geändert.");
-    vclink_host::setGlobalLocale(fl::i18n::VkLocale("ja"));
-    EXPECT_STREQ(exception.what(), "削除するファイルがありません。何も変更されていません。");
-    vclink_host::setGlobalLocale(before);
+    EXPECT_EQ(exception.GetID(), "shared_vclink:git:NoFilesToRemove");
+    const struct
+    {
+        const char *locale;
+        const char *text;
+    } rows[] = {{"C", "There are no files to remove. Nothing was changed."},
+                {"de_DE.UTF-8", "Es gibt keine Dateien zu entfernen. Es wurde nichts geändert."},
+                {"ja", "削除するファイルがありません。何も変更されていません。"}};
+    for (const auto &row : rows)
+    {
+        const vclink::test::LocaleOfTheProcess locale(row.locale);
+        EXPECT_STREQ(exception.what(), row.text);
+    }
 }
 
 TEST(StandInExceptions, KeepTheTextOfACopyApart)

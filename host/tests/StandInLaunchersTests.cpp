@@ -1,34 +1,19 @@
 // SPDX-License-Identifier: MIT
 // The tools that the stand-in ships at the place below the installation that is agreed on.
-#include <array>
-#include <cstdio>
 #include <filesystem>
 #include <string>
 
 #include <gtest/gtest.h>
-#include <sys/wait.h>
 
-#include "support/TemporaryFolder.hpp"
+#include "support/Command.hpp"
+#include "support/Files.hpp"
 
+using vclink::test::Command;
+using vclink::test::CommandResult;
 using namespace vclink_host_tests;
 
 namespace
 {
-
-struct Result
-{
-    int status = -1;
-    /// Of standard output and standard error together.
-    std::string output;
-};
-
-std::string quoted(const std::string &word)
-{
-    std::string text = "'";
-    for (const char character : word)
-        text += character == '\'' ? std::string("'\\''") : std::string(1, character);
-    return text + "'";
-}
 
 std::string launcher(const std::string &name)
 {
@@ -44,39 +29,26 @@ class StandInLaunchers : public testing::Test
     }
 
     /// Runs a launcher with files of the folder as its arguments.
-    template <class... Names> Result run(const std::string &path, const Names &...names) const
+    template <class... Names> CommandResult run(const std::string &path, const Names &...names)
     {
-        return runWith(path, folder_.file(names)...);
-    }
-    template <class... Words> static Result runWith(const std::string &path, const Words &...words)
-    {
-        std::string command = quoted(path);
-        ((command += ' ' + quoted(words)), ...);
-        Result result;
-        std::FILE *const output = ::popen((command + " 2>&1 </dev/null").c_str(), "r");
-        std::array<char, 4096> block{};
-        for (std::size_t size = 0; (size = std::fread(block.data(), 1, block.size(), output)) != 0;)
-            result.output.append(block.data(), size);
-        const int status = ::pclose(output);
-        result.status = WIFEXITED(status) ? WEXITSTATUS(status) : -1;
-        return result;
+        return Command({path, folder_.file(names)...}).run();
     }
     void writeSides(const std::string &ours, const std::string &theirs) const
     {
-        writeFile(folder_.file("base"), "1\n2\n3\n4\n5\n");
-        writeFile(folder_.file("ours"), ours);
-        writeFile(folder_.file("theirs"), theirs);
+        folder_.write("base", "1\n2\n3\n4\n5\n");
+        folder_.write("ours", ours);
+        folder_.write("theirs", theirs);
     }
     std::string read(const std::string &name) const
     {
-        return readFile(folder_.file(name));
+        return folder_.read(name);
     }
     bool nothingIsLeft() const
     {
         return std::filesystem::is_empty(temporary_);
     }
 
-    const TemporaryFolder folder_;
+    const Folder folder_;
 
   private:
     const std::string temporary_ = folder_.file("tmp with a blank");
@@ -100,7 +72,7 @@ TEST_F(StandInLaunchers, CanBeExecuted)
 TEST_F(StandInLaunchers, MergeIntoOneOfTheSides)
 {
     writeSides("ours\n2\n3\n4\n5\n", "1\n2\n3\n4\ntheirs\n");
-    EXPECT_EQ(run(launcher("vkAutoMerge.sh"), "base", "ours", "theirs", "ours").status, 0);
+    EXPECT_EQ(run(launcher("vkAutoMerge.sh"), "base", "ours", "theirs", "ours").exitStatus, 0);
     EXPECT_EQ(read("ours"), clean);
     EXPECT_EQ(read("base"), "1\n2\n3\n4\n5\n");
     EXPECT_EQ(read("theirs"), "1\n2\n3\n4\ntheirs\n");
@@ -112,8 +84,8 @@ TEST_F(StandInLaunchers, MergeIntoAFourthFile)
     for (const auto *name : {"vkAutoMerge.sh", "vkMerge"})
     {
         writeSides("ours\n2\n3\n4\n5\n", "1\n2\n3\n4\ntheirs\n");
-        writeFile(folder_.file("merged"), "with markers\n");
-        EXPECT_EQ(run(launcher(name), "base", "ours", "theirs", "merged").status, 0) << name;
+        folder_.write("merged", "with markers\n");
+        EXPECT_EQ(run(launcher(name), "base", "ours", "theirs", "merged").exitStatus, 0) << name;
         EXPECT_EQ(read("merged"), clean) << name;
         EXPECT_EQ(read("ours"), "ours\n2\n3\n4\n5\n") << name;
     }
@@ -124,8 +96,8 @@ TEST_F(StandInLaunchers, TellConflictsAndLeaveTheResultAsItIs)
     for (const auto *name : {"vkAutoMerge.sh", "vkMerge"})
     {
         writeSides("ours\n", "theirs\n");
-        writeFile(folder_.file("merged"), "as it was\n");
-        EXPECT_GT(run(launcher(name), "base", "ours", "theirs", "merged").status, 0) << name;
+        folder_.write("merged", "as it was\n");
+        EXPECT_GT(run(launcher(name), "base", "ours", "theirs", "merged").exitStatus, 0) << name;
         EXPECT_EQ(read("merged"), "as it was\n") << name;
         EXPECT_TRUE(nothingIsLeft()) << name;
     }
@@ -134,7 +106,7 @@ TEST_F(StandInLaunchers, TellConflictsAndLeaveTheResultAsItIs)
 TEST_F(StandInLaunchers, TellConflictsOfBinaryFiles)
 {
     writeSides(std::string("ours\0", 5), std::string("theirs\0", 7));
-    EXPECT_GT(run(launcher("vkAutoMerge.sh"), "base", "ours", "theirs", "ours").status, 0);
+    EXPECT_GT(run(launcher("vkAutoMerge.sh"), "base", "ours", "theirs", "ours").exitStatus, 0);
     EXPECT_EQ(read("ours"), std::string("ours\0", 5));
     EXPECT_TRUE(nothingIsLeft());
 }
@@ -144,27 +116,22 @@ TEST_F(StandInLaunchers, TellAFileThatIsMissing)
     writeSides("ours\n", "theirs\n");
     for (const auto *name : {"vkAutoMerge.sh", "vkMerge"})
     {
-        EXPECT_GT(run(launcher(name), "missing", "ours", "theirs", "ours").status, 0) << name;
+        EXPECT_GT(run(launcher(name), "missing", "ours", "theirs", "ours").exitStatus, 0) << name;
         EXPECT_EQ(read("ours"), "ours\n") << name;
     }
-    EXPECT_GT(run(launcher("vkDiff"), "missing", "ours").status, 0);
+    EXPECT_GT(run(launcher("vkDiff"), "missing", "ours").exitStatus, 0);
 }
 
-TEST_F(StandInLaunchers, ShowWhatIsDifferent)
+TEST_F(StandInLaunchers, ShowWhatIsDifferentAndNothingOfEqualFiles)
 {
-    writeSides("1\n2\n3\nours\n5\n", "");
-    const Result result = run(launcher("vkDiff"), "base", "ours");
-    EXPECT_EQ(result.status, 0);
+    writeSides("1\n2\n3\nours\n5\n", "1\n2\n3\n4\n5\n");
+    const CommandResult result = run(launcher("vkDiff"), "base", "ours");
+    EXPECT_EQ(result.exitStatus, 0);
     EXPECT_EQ(result.output, "--- " + folder_.file("base") + "\n+++ " + folder_.file("ours") +
                                  "\n@@ -1,5 +1,5 @@\n 1\n 2\n 3\n-4\n+ours\n 5\n");
-}
-
-TEST_F(StandInLaunchers, ShowNothingOfEqualFiles)
-{
-    writeSides("1\n2\n3\n4\n5\n", "");
-    const Result result = run(launcher("vkDiff"), "base", "ours");
-    EXPECT_EQ(result.status, 0);
-    EXPECT_EQ(result.output, "");
+    const CommandResult equal = run(launcher("vkDiff"), "base", "theirs");
+    EXPECT_EQ(equal.exitStatus, 0);
+    EXPECT_EQ(equal.output, "");
 }
 
 /// As the settings of the tools have it.
@@ -172,23 +139,26 @@ TEST_F(StandInLaunchers, TakeAWorkingFolderFromBeforeAnAbsoluteName)
 {
     writeSides("ours\n2\n3\n4\n5\n", "1\n2\n3\n4\ntheirs\n");
     const std::string before = std::filesystem::current_path().string() + '/';
-    const Result merged =
-        runWith(launcher("vkMerge"), before + folder_.file("base"), before + folder_.file("ours"),
-                before + folder_.file("theirs"), before + folder_.file("a new file"));
-    EXPECT_EQ(merged.status, 0) << merged.output;
+    const CommandResult merged =
+        Command({launcher("vkMerge"), before + folder_.file("base"), before + folder_.file("ours"),
+                 before + folder_.file("theirs"), before + folder_.file("a new file")})
+            .run();
+    EXPECT_EQ(merged.exitStatus, 0) << merged.errors;
     EXPECT_EQ(read("a new file"), clean);
-    const Result different =
-        runWith(launcher("vkDiff"), folder_.file("base"), before + folder_.file("ours"));
-    EXPECT_EQ(different.status, 0) << different.output;
+    const CommandResult different =
+        Command({launcher("vkDiff"), folder_.file("base"), before + folder_.file("ours")}).run();
+    EXPECT_EQ(different.exitStatus, 0) << different.errors;
     EXPECT_NE(different.output.find("+++ " + folder_.file("ours") + '\n'), std::string::npos);
-    EXPECT_EQ(runWith(launcher("vkDiff"), folder_.file("base"), before + "/dev/null").status, 0);
+    EXPECT_EQ(
+        Command({launcher("vkDiff"), folder_.file("base"), before + "/dev/null"}).run().exitStatus,
+        0);
 }
 
 TEST_F(StandInLaunchers, LeaveOtherDoubleSlashesInNames)
 {
     writeSides("ours\n", "");
     std::filesystem::create_directory(folder_.file("in"));
-    writeFile(folder_.file("in/file"), "1\n");
+    folder_.write("in/file", "1\n");
     EXPECT_NE(run(launcher("vkDiff"), "base", "in//file").output.find("in//file\n"),
               std::string::npos);
 }
@@ -197,11 +167,11 @@ TEST_F(StandInLaunchers, ShowWhatIsDifferentInFolders)
 {
     for (const std::string name : {"left", "right"})
         std::filesystem::create_directory(folder_.file(name));
-    writeFile(folder_.file("left/a file"), "1\n");
-    writeFile(folder_.file("right/a file"), "2\n");
-    writeFile(folder_.file("right/new"), "new\n");
-    const Result result = run(launcher("vkDiff"), "left", "right");
-    EXPECT_EQ(result.status, 0);
+    folder_.write("left/a file", "1\n");
+    folder_.write("right/a file", "2\n");
+    folder_.write("right/new", "new\n");
+    const CommandResult result = run(launcher("vkDiff"), "left", "right");
+    EXPECT_EQ(result.exitStatus, 0);
     EXPECT_NE(result.output.find("\n-1\n+2\n"), std::string::npos) << result.output;
     EXPECT_NE(result.output.find("\n+new\n"), std::string::npos) << result.output;
 }
@@ -209,11 +179,11 @@ TEST_F(StandInLaunchers, ShowWhatIsDifferentInFolders)
 TEST_F(StandInLaunchers, WantTheirNumberOfArguments)
 {
     writeSides("ours\n", "theirs\n");
-    EXPECT_EQ(run(launcher("vkAutoMerge.sh"), "base", "ours", "theirs").status, 2);
-    EXPECT_EQ(run(launcher("vkMerge")).status, 2);
-    EXPECT_EQ(run(launcher("vkMerge"), "base", "ours", "theirs", "ours", "more").status, 2);
-    EXPECT_EQ(run(launcher("vkDiff"), "base").status, 2);
-    EXPECT_EQ(run(launcher("vkDiff")).output, "usage: vkDiff LOCAL REMOTE\n");
+    EXPECT_EQ(run(launcher("vkAutoMerge.sh"), "base", "ours", "theirs").exitStatus, 2);
+    EXPECT_EQ(run(launcher("vkMerge")).exitStatus, 2);
+    EXPECT_EQ(run(launcher("vkMerge"), "base", "ours", "theirs", "ours", "more").exitStatus, 2);
+    EXPECT_EQ(run(launcher("vkDiff"), "base").exitStatus, 2);
+    EXPECT_EQ(run(launcher("vkDiff")).errors, "usage: vkDiff LOCAL REMOTE\n");
     EXPECT_EQ(read("ours"), "ours\n");
 }
 
@@ -224,7 +194,7 @@ TEST_F(StandInLaunchers, WorkBelowAFolderWithABlank)
     for (const auto *name : {"vkAutoMerge.sh", "vkMerge"})
         std::filesystem::copy_file(launcher(name), copy + '/' + name);
     writeSides("ours\n2\n3\n4\n5\n", "1\n2\n3\n4\ntheirs\n");
-    EXPECT_EQ(run(copy + "/vkMerge", "base", "ours", "theirs", "a new file").status, 0);
+    EXPECT_EQ(run(copy + "/vkMerge", "base", "ours", "theirs", "a new file").exitStatus, 0);
     EXPECT_EQ(read("a new file"), clean);
 }
 

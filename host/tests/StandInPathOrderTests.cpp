@@ -1,28 +1,23 @@
 // SPDX-License-Identifier: MIT
 #include <gtest/gtest.h>
 
-#include "support/AllocationCount.hpp"
+#include "support/AllocationCounter.hpp"
 #include "support/ElementOrder.hpp"
 #include "vclink/FileStateMap.hpp"
 
 TEST(StandInPathOrder, AllocatesNothing)
 {
-    std::vector<upath> paths;
-    for (const ustring &text : vclink_host_tests::makeRandomPaths(3, 300))
-    {
-        paths.emplace_back(text);
-    }
+    const auto texts = vclink_host_tests::makeRandomPaths(3, 300);
+    const std::vector<upath> paths(texts.begin(), texts.end());
     const auto less = vclink::FileStateMap().key_comp();
-    const std::size_t before = vclink_host_tests::getAllocationCount();
+    const vclink::test::AllocationCounter counter;
     std::size_t ordered = 0;
     for (const upath &left : paths)
     {
         for (const upath &right : paths)
-        {
             ordered += less(left, right) ? 1 : 0;
-        }
     }
-    EXPECT_EQ(vclink_host_tests::getAllocationCount(), before);
+    EXPECT_EQ(counter.count(), 0U);
     EXPECT_GT(ordered, 0U);
     EXPECT_TRUE(noexcept(less(paths[0], paths[1])));
 }
