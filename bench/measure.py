@@ -224,7 +224,7 @@ def parse():
     parser.add_argument("--build", required=True, help="the build folder")
     parser.add_argument("--scratch", required=True, help="an empty folder with a short name")
     parser.add_argument("--quick", action="store_true", help="without the largest working copy")
-    parser.add_argument("--readme", help="file to write the tables into")
+    parser.add_argument("--page", help="file to write the tables into")
     return parser.parse_args()
 
 
@@ -241,8 +241,8 @@ def main():
     tables = bench.tables()
     text = "\n\n".join([describe(len(options.scratch) + 2), *map(str, tables)])
     print(text)
-    if options.readme:
-        write_into(options.readme, text)
+    if options.page:
+        write_into(options.page, text)
     failed = [what for table in tables for what in table.failed]
     print(f"\nbench: {'over the limit: ' + '; '.join(failed) if failed else 'within all limits'}",
           file=sys.stderr)

@@ -1,5 +1,5 @@
 # SPDX-License-Identifier: MIT
-"""The table of results, its limits and verdicts, and its place in the README."""
+"""The table of results, its limits and verdicts, and the page that they are in."""
 
 import sys
 
@@ -35,13 +35,13 @@ class Table:
         return "\n".join(f"| {' | '.join(cells)} |" for cells in [header, rule, *self._rows])
 
 
-def write_into(readme, text):
-    """Puts the text between the README's markers."""
-    with open(readme, encoding="utf-8") as file:
+def write_into(page, text):
+    """Puts the text between the page's markers."""
+    with open(page, encoding="utf-8") as file:
         content = file.read()
     if content.count(BEGIN) != 1 or content.count(END) != 1:
-        sys.exit(f"bench: {readme} does not have the two markers of the table once each")
+        sys.exit(f"bench: {page} does not have the two markers of the table once each")
     before, rest = content.split(BEGIN)
     after = rest.split(END)[1]
-    with open(readme, "w", encoding="utf-8") as file:
+    with open(page, "w", encoding="utf-8") as file:
         file.write(f"{before}{BEGIN}\n{text}\n{END}{after}")
