@@ -16,9 +16,9 @@ START = r"(?:\A\s*|[.;:|!?]\s+|\n[ ]*\n\s*)"
 PHRASES = [
     (r"\b(?:comes?|came|coming)\s+of\b", "follows from, is caused by"),
     (r"\b(?:stands?|stood|standing)\s+(?:in|for|beside|below|at|between|behind|on)\b(?!-)", "is in, means"),
-    (r"\bstands\b|\bstood\b", "is"),
+    (r"\b(?:stands|stood)\b(?!\s+(?:in|for|beside|below|at|between|behind|on)\b)", "is"),
     (r"\btold\s+(?:in|by|at)\b", "described in, reported by"),
-    (r"\btells\b(?!\s+apart)|\btells?\s+(?:of|in|by)\b", "describes, reports, returns"),
+    (r"\btells\b(?!\s+apart)|\btell\s+(?:of|in|by)\b", "describes, reports, returns"),
     (r"\bsave\s+(?:for|that|of|in|where|when|the|by|out)\b", "except"),
     (r"\bwhich\s+is\s+meant\b|\bor\s+is\s+meant\b", "intentionally"),
     (r"\banew\b", "again"),
