@@ -75,52 +75,36 @@ class GitDeletersTest : public test::GitFixture
     OwnedHandle<git_commit> commit_;
 };
 
-TEST_F(GitDeletersTest, ReleasesWhatIsLookedUp)
+TEST_F(GitDeletersTest, ReleasesEachHandleByItsFunction)
 {
     const git_oid *const id = git_commit_id(commit());
-    expectReleasedBy<git_commit>("git_commit_free",
-                                 acquire<git_commit>(git_commit_lookup, repository(), id));
-    expectReleasedBy<git_object>(
-        "git_object_free",
-        acquire<git_object>(git_object_lookup, repository(), id, GIT_OBJECT_ANY));
-    expectReleasedBy<git_tree>("git_tree_free", acquire<git_tree>(git_commit_tree, commit()));
-    expectReleasedBy<git_annotated_commit>(
-        "git_annotated_commit_free",
-        acquire<git_annotated_commit>(git_annotated_commit_lookup, repository(), id));
-    const OwnedHandle<git_odb> store = acquire<git_odb>(git_repository_odb, repository()).value();
-    expectReleasedBy<git_odb_object>("git_odb_object_free",
-                                     acquire<git_odb_object>(git_odb_read, store.get(), id));
-}
-
-TEST_F(GitDeletersTest, ReleasesWhatBelongsToARepository)
-{
-    expectReleasedBy<git_repository>(
+    const auto store = acquire<git_odb>(git_repository_odb, repository()).value();
+    const auto index = acquire<git_index>(git_repository_index, repository()).value();
+    expectReleasedBy("git_commit_free", acquire<git_commit>(git_commit_lookup, repository(), id));
+    expectReleasedBy("git_object_free",
+                     acquire<git_object>(git_object_lookup, repository(), id, GIT_OBJECT_ANY));
+    expectReleasedBy("git_tree_free", acquire<git_tree>(git_commit_tree, commit()));
+    expectReleasedBy("git_annotated_commit_free",
+                     acquire<git_annotated_commit>(git_annotated_commit_lookup, repository(), id));
+    expectReleasedBy("git_odb_object_free", acquire<git_odb_object>(git_odb_read, store.get(), id));
+    expectReleasedBy(
         "git_repository_free",
         acquire<git_repository>(git_repository_open, git_repository_path(repository())));
-    expectReleasedBy<git_config>("git_config_free",
-                                 acquire<git_config>(git_repository_config, repository()));
-    expectReleasedBy<git_odb>("git_odb_free", acquire<git_odb>(git_repository_odb, repository()));
-    expectReleasedBy<git_index>("git_index_free",
-                                acquire<git_index>(git_repository_index, repository()));
-    const OwnedHandle<git_index> index =
-        acquire<git_index>(git_repository_index, repository()).value();
-    expectReleasedBy<git_index_conflict_iterator>(
+    expectReleasedBy("git_config_free", acquire<git_config>(git_repository_config, repository()));
+    expectReleasedBy("git_odb_free", acquire<git_odb>(git_repository_odb, repository()));
+    expectReleasedBy("git_index_free", acquire<git_index>(git_repository_index, repository()));
+    expectReleasedBy(
         "git_index_conflict_iterator_free",
         acquire<git_index_conflict_iterator>(git_index_conflict_iterator_new, index.get()));
-}
-
-TEST_F(GitDeletersTest, ReleasesReferencesRemotesAndSignatures)
-{
-    expectReleasedBy<git_reference>("git_reference_free",
-                                    acquire<git_reference>(git_repository_head, repository()));
-    expectReleasedBy<git_branch_iterator>(
+    expectReleasedBy("git_reference_free",
+                     acquire<git_reference>(git_repository_head, repository()));
+    expectReleasedBy(
         "git_branch_iterator_free",
         acquire<git_branch_iterator>(git_branch_iterator_new, repository(), GIT_BRANCH_ALL));
-    expectReleasedBy<git_remote>("git_remote_free",
-                                 acquire<git_remote>(git_remote_create_detached, "/nowhere"));
-    expectReleasedBy<git_signature>(
-        "git_signature_free",
-        acquire<git_signature>(git_signature_new, "Name", "name@example.org", 0, 0));
+    expectReleasedBy("git_remote_free",
+                     acquire<git_remote>(git_remote_create_detached, "/nowhere"));
+    expectReleasedBy("git_signature_free",
+                     acquire<git_signature>(git_signature_new, "Name", "name@example.org", 0, 0));
 }
 
 template <class... Handles> void releaseNulls()

@@ -1,23 +1,23 @@
 // SPDX-License-Identifier: MIT
 #include "vclink/git/GitException.hpp"
 
+#include <algorithm>
 #include <cstdint>
-#include <memory>
 #include <optional>
 #include <string>
-#include <typeinfo>
 #include <utility>
 #include <vector>
 
-#include <boost/exception/exception.hpp>
 #include <boost/variant/get.hpp>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include "error/catalogueText.hpp"
+#include "error/exceptions.hpp"
 #include "error/logging/severity.hpp"
 #include "fl/i18n/convert.hpp"
 #include "support/LogCapture.hpp"
+#include "support/isRecord.hpp"
 #include "vclink/git/messageIdentifiers.hpp"
 
 namespace vclink::git
@@ -25,7 +25,6 @@ namespace vclink::git
 namespace
 {
 
-using computils::exception::StackTraceRecordingException;
 using foundation::core::except::IException;
 using foundation::core::except::IMsgIDException;
 using foundation::core::except::IUserException;
@@ -33,18 +32,9 @@ using resource_core::GenericMsgIDHolder;
 using shared_vclink::git::LibGit2Error;
 using shared_vclink::git::MergeFailed;
 using test::catalogueText;
+using test::framesOf;
 using test::LogCapture;
 using testing::IsEmpty;
-
-std::vector<const void *> framesOf(const StackTraceRecordingException &exception)
-{
-    std::vector<const void *> frames;
-    for (std::size_t index = 0; index < exception.getStackTrace().size(); ++index)
-    {
-        frames.push_back(exception.getStackTrace().frame(index));
-    }
-    return frames;
-}
 
 /// Makes an exception, and tells where the caller goes on after the call.
 [[gnu::noinline]] GitException makeException(const void *&returnsTo)
@@ -65,22 +55,17 @@ void expectSameContent(const GitException &copy, const GitException &original)
     EXPECT_EQ(framesOf(copy), framesOf(original));
 }
 
-TEST(GitException, HasTheCataloguesTextWhenNothingIsAdded)
+TEST(GitException, HasTheCataloguesTextAndTheAddedOneAfterALineFeed)
 {
     const MergeFailed message("topic");
     EXPECT_EQ(GitException(message).GetUnicodeMessageTxt(), catalogueText(message));
     EXPECT_EQ(GitException(message, u"").GetUnicodeMessageTxt(), catalogueText(message));
     EXPECT_NE(catalogueText(message).back(), u'\n');
-}
-
-TEST(GitException, HasTheAddedTextAfterOneLineFeed)
-{
-    const MergeFailed message("topic");
     EXPECT_EQ(GitException(message, u"cause\n").GetUnicodeMessageTxt(),
               catalogueText(message) + u"\ncause\n");
 }
 
-TEST(GitException, GivesItsTextInEveryWay)
+TEST(GitException, GivesItsTextInEveryWayAndConvertsTextsAsEveryUsersException)
 {
     const GitException exception(MergeFailed("Z\xC3\xBCrich"), u"\u6771\u4EAC");
     const ustring text = exception.GetUnicodeMessageTxt();
@@ -89,11 +74,6 @@ TEST(GitException, GivesItsTextInEveryWay)
     EXPECT_EQ(exception.what(), narrow);
     EXPECT_EQ(static_cast<const IException &>(exception).what(), narrow);
     EXPECT_EQ(static_cast<const std::exception &>(exception).what(), narrow);
-}
-
-TEST(GitException, ConvertsTextsAsEveryUsersException)
-{
-    const GitException exception(MergeFailed("topic"));
     EXPECT_EQ(exception.convert_str(ustring(u"Z\u00FCrich")), u"Z\u00FCrich");
     EXPECT_EQ(exception.convert_str(std::string("Z\xC3\xBCrich")), u"Z\u00FCrich");
 }
@@ -121,52 +101,24 @@ TEST(GitException, KeepsACopyOfTheMessageOfItsOwn)
     EXPECT_EQ(boost::get<ustring>(kept.getArguments()[2]), u"text");
 }
 
-TEST(GitException, IsCopiedDeeply)
+TEST(GitException, IsCopiedClonedAndRethrownWithAllItHolds)
 {
-    auto original = std::make_unique<GitException>(MergeFailed("topic"), u"cause");
+    const void *returnsTo = nullptr;
+    auto original = std::make_unique<GitException>(makeException(returnsTo));
+    test::expectCopies(*original,
+                       [&](const GitException &copy) { expectSameContent(copy, *original); });
     const GitException copy(*original);
     expectSameContent(copy, *original);
     original.reset();
     EXPECT_EQ(copy.GetUnicodeMessageTxt(), catalogueText(MergeFailed("topic")) + u"\ncause");
 }
 
-TEST(GitException, ClonesItselfToTheHeap)
-{
-    const GitException original(MergeFailed("topic"), u"cause");
-    const boost::exception_detail::clone_base &asBase = original;
-    const std::unique_ptr<const boost::exception_detail::clone_base> clone(asBase.clone());
-    ASSERT_NE(clone.get(), &asBase);
-    const boost::exception_detail::clone_base &cloned = *clone;
-    EXPECT_EQ(typeid(cloned), typeid(GitException));
-    expectSameContent(dynamic_cast<const GitException &>(cloned), original);
-}
-
-TEST(GitException, RethrowsACopyOfItself)
-{
-    const GitException original(MergeFailed("topic"), u"cause");
-    try
-    {
-        static_cast<const IUserException &>(original).rethrow();
-        ADD_FAILURE() << "nothing was raised";
-    }
-    catch (const GitException &copy)
-    {
-        EXPECT_NE(&copy, &original);
-        EXPECT_EQ(typeid(copy), typeid(GitException));
-        expectSameContent(copy, original);
-    }
-}
-
 TEST(GitException, IsCaughtAsEachOfItsBases)
 {
-    const auto raise = [] { throw GitException(MergeFailed("topic")); };
-    EXPECT_THROW(raise(), IMsgIDException);
-    EXPECT_THROW(raise(), IUserException);
-    EXPECT_THROW(raise(), IException);
-    EXPECT_THROW(raise(), boost::exception);
-    EXPECT_THROW(raise(), vclink::exception::SourceControlException);
-    EXPECT_THROW(raise(), StackTraceRecordingException);
-    EXPECT_THROW(raise(), std::exception);
+    test::expectCaughtAs<IMsgIDException, IUserException, IException, boost::exception,
+                         vclink::exception::SourceControlException,
+                         computils::exception::StackTraceRecordingException, std::exception>(
+        [] { throw GitException(MergeFailed("topic")); });
 }
 
 TEST(GitException, RecordsTheStackOfTheCodeThatRaisesIt)
@@ -174,48 +126,17 @@ TEST(GitException, RecordsTheStackOfTheCodeThatRaisesIt)
     const void *returnsTo = nullptr;
     const GitException exception = makeException(returnsTo);
     const std::vector<const void *> frames = framesOf(exception);
-    std::size_t raising = 0;
-    while (raising < frames.size() && frames[raising] != returnsTo)
-    {
-        ++raising;
-    }
-    ASSERT_LT(raising, frames.size()) << "the caller of the raising function is not there";
-    ASSERT_GT(raising, 0u);
-    const auto inside = reinterpret_cast<std::uintptr_t>(frames[raising - 1]);
+    const auto caller = std::find(frames.begin(), frames.end(), returnsTo);
+    ASSERT_NE(caller, frames.end()) << "the caller of the raising function is not there";
+    ASSERT_NE(caller, frames.begin());
+    const auto inside = reinterpret_cast<std::uintptr_t>(*std::prev(caller));
     const auto function = reinterpret_cast<std::uintptr_t>(&makeException);
     EXPECT_GT(inside, function);
     EXPECT_LT(inside, function + 0x10000);
     EXPECT_EQ(exception.getText(), ustring());
 }
 
-TEST(GitException, KeepsTheStackOfItsMakingWhenCopiedElsewhere)
-{
-    const void *returnsTo = nullptr;
-    const GitException original = makeException(returnsTo);
-    const auto copyElsewhere = [&original] { return GitException(original); };
-    EXPECT_EQ(framesOf(copyElsewhere()), framesOf(original));
-}
-
-TEST(GitException, ReportsItsStackWhenAskedForItsNarrowText)
-{
-    const LogCapture log;
-    try
-    {
-        throw GitException(MergeFailed("topic"));
-    }
-    catch (const std::exception &exception)
-    {
-        EXPECT_THAT(log.messages(), IsEmpty());
-        static_cast<void>(exception.what());
-        const auto &raised = dynamic_cast<const GitException &>(exception);
-        const auto records = log.records();
-        ASSERT_EQ(records.size(), 1u);
-        EXPECT_EQ(records[0].severity, 0x200u);
-        EXPECT_EQ(records[0].message, fl::i18n::to_string(raised.getStackTrace().to_text()));
-    }
-}
-
-TEST(GitException, ReportsNoStackForItsOtherTexts)
+TEST(GitException, ReportsItsStackWhenAskedForItsNarrowTextOnly)
 {
     const GitException exception(MergeFailed("topic"), u"cause");
     const LogCapture log;
@@ -223,6 +144,17 @@ TEST(GitException, ReportsNoStackForItsOtherTexts)
     static_cast<void>(exception.ToUstringImpl());
     static_cast<void>(exception.GetID());
     EXPECT_THAT(log.messages(), IsEmpty());
+    try
+    {
+        throw GitException(exception);
+    }
+    catch (const std::exception &raised)
+    {
+        static_cast<void>(raised.what());
+    }
+    EXPECT_THAT(log.records(),
+                testing::ElementsAre(test::isRecord(
+                    0x200u, fl::i18n::to_string(exception.getStackTrace().to_text()))));
 }
 
 TEST(GitException, ReportsNoStackWhereStackTracesAreDisabled)
@@ -235,6 +167,7 @@ TEST(GitException, ReportsNoStackWhereStackTracesAreDisabled)
 
 TEST(GitException, IsAnEmptyHolderAfterAMove)
 {
+    using Empty = GenericMsgIDHolder::EmptyGenericMsgIDHolder;
     GitException source(MergeFailed("topic"), u"cause");
     const GitException target(std::move(source));
     EXPECT_EQ(target.GetBaseMsgIDObj().getKey(), "MergeFailed");
@@ -243,15 +176,14 @@ TEST(GitException, IsAnEmptyHolderAfterAMove)
         static_cast<void>(source.GetBaseMsgIDObj());
         ADD_FAILURE() << "nothing was raised";
     }
-    catch (const GenericMsgIDHolder::EmptyGenericMsgIDHolder &empty)
+    catch (const Empty &empty)
     {
         EXPECT_STREQ(empty.what(), "GenericMsgIDHolder object is empty!\n");
         EXPECT_NE(dynamic_cast<const boost::exception_detail::clone_base *>(&empty), nullptr)
             << "Boost can't clone it";
     }
-    EXPECT_THROW(static_cast<void>(source.GetID()), GenericMsgIDHolder::EmptyGenericMsgIDHolder);
-    EXPECT_THROW(static_cast<void>(source.GetUnicodeMessageTxt()),
-                 GenericMsgIDHolder::EmptyGenericMsgIDHolder);
+    EXPECT_THROW(static_cast<void>(source.GetID()), Empty);
+    EXPECT_THROW(static_cast<void>(source.GetUnicodeMessageTxt()), Empty);
     EXPECT_STRNE(source.what(), "");
 }
 

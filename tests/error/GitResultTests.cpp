@@ -11,8 +11,8 @@
 #include <gtest/gtest.h>
 
 #include "error/HermeticLibGit2.hpp"
-#include "error/errorUtil/libgit2Errors.hpp"
 #include "error/logging/severity.hpp"
+#include "error/makeError.hpp"
 #include "support/Failure.hpp"
 #include "support/LogCapture.hpp"
 #include "support/libgit2Release.hpp"
@@ -25,7 +25,7 @@ namespace
 
 using test::Failure;
 using test::failureOf;
-using test::HermeticLibGit2;
+using test::isError;
 using test::LogCapture;
 using testing::ElementsAre;
 using testing::IsEmpty;
@@ -99,59 +99,60 @@ void expectBadAccess(Action action, const std::string &text, const std::string &
     }
 }
 
-TEST(GitResult, GivesTheValueItHoldsAndWritesNothing)
+class GitResultTest : public testing::Test
+{
+    const test::HermeticLibGit2 libgit2_;
+};
+using GitCheck = GitResultTest;
+using GitErrorPolicyTest = GitResultTest;
+
+TEST_F(GitResultTest, GivesTheValueOrTheErrorItHoldsAndWritesNothing)
 {
     const LogCapture log;
-    const GitResult<const char *> result("value");
-    EXPECT_STREQ(result.value(), "value");
+    const GitResult<const char *> value("value");
+    EXPECT_STREQ(value.value(), "value");
+    const GitResult<void> failure = makeResult(GIT_ITEROVER);
+    EXPECT_TRUE(failure.has_error());
+    EXPECT_FALSE(failure.has_value());
+    EXPECT_EQ(failure.error().getCode(), GIT_ITEROVER);
     EXPECT_THAT(log.messages(), IsEmpty());
 }
 
-TEST(GitResult, OfASuccessHoldsADefaultMadeError)
+TEST_F(GitResultTest, OfASuccessHoldsADefaultMadeError)
 {
-    const HermeticLibGit2 libgit2;
     git_error_set_str(GIT_ERROR_NET, "stale");
     const GitResult<void> result = makeResult(0);
     ASSERT_TRUE(result.has_value());
     EXPECT_FALSE(result.has_error());
 #if BOOST_VERSION < 107600 // Later releases keep the value and the error in one place.
-    EXPECT_EQ(Peek::error(result).getCode(), 0);
-    EXPECT_EQ(Peek::error(result).getErrorClass(), 0);
-    EXPECT_EQ(Peek::error(result).getMessage(), ustring());
+    EXPECT_THAT(Peek::error(result), isError(0, 0, u""));
 #endif
 }
 
 int answerWith(int code, const char *text)
 {
     if (text != nullptr)
-    {
         git_error_set_str(GIT_ERROR_NET, text);
-    }
     return code;
 }
+const char *const none = nullptr;
 
-TEST(GitResult, OfACallHasItsOwnTextAndNoEarlierOne)
+TEST_F(GitResultTest, OfACallHasItsOwnTextAndNoEarlierOne)
 {
-    const HermeticLibGit2 libgit2;
-    const char *const none = nullptr;
     git_error_set_str(GIT_ERROR_CONFIG, "stale");
     EXPECT_TRUE(call(answerWith, 0, none).has_value());
     EXPECT_TRUE(test::libgit2Release::isSilent());
     git_error_set_str(GIT_ERROR_CONFIG, "stale");
     const GitResult<void> silent = call(answerWith, -5, none);
     ASSERT_TRUE(silent.has_error());
-    EXPECT_EQ(silent.error().getCode(), -5);
-    EXPECT_EQ(silent.error().getErrorClass(), 0);
-    EXPECT_EQ(silent.error().getMessage(), ustring());
+    EXPECT_THAT(silent.error(), isError(-5, 0, u""));
     const GitResult<void> told = call(answerWith, -6, "reason");
     ASSERT_TRUE(told.has_error());
-    EXPECT_EQ(told.error().getErrorClass(), GIT_ERROR_NET);
-    EXPECT_EQ(told.error().getMessage(), u"reason");
+    EXPECT_THAT(told.error(), isError(-6, GIT_ERROR_NET, u"reason"));
 }
 
-TEST(GitResult, OfAFailureRaisesItWhenAskedForItsValue)
+TEST_F(GitResultTest, OfAFailureRaisesItWhenAskedForItsValue)
 {
-    const HermeticLibGit2 libgit2;
     git_error_set_str(GIT_ERROR_INDEX, "locked");
     const GitResult<void> result = makeResult(GIT_ELOCKED);
     git_error_clear();
@@ -159,35 +160,18 @@ TEST(GitResult, OfAFailureRaisesItWhenAskedForItsValue)
               (Failure{GIT_ELOCKED, GIT_ERROR_INDEX, "locked"}));
 }
 
-TEST(GitCheck, RaisesTheFailureOfItsCall)
+TEST_F(GitCheck, LeavesASuccessAloneAndRaisesAFailureThatIsThereAlreadyOrOfItsCall)
 {
-    const HermeticLibGit2 libgit2;
-    const char *const none = nullptr;
-    EXPECT_NO_THROW(check(answerWith, 0, none));
-    const auto failure = failureOf([&] { check(answerWith, GIT_ELOCKED, "locked"); });
-    EXPECT_EQ(failure.code, GIT_ELOCKED);
-    EXPECT_EQ(failure.text, "locked");
-}
-
-TEST(GitCheck, LeavesASuccessAloneAndRaisesAFailureThatIsThereAlready)
-{
-    const HermeticLibGit2 libgit2;
     const LogCapture log;
     EXPECT_NO_THROW(check(makeResult(0)));
     EXPECT_THAT(log.messages(), IsEmpty());
     EXPECT_THROW(check(makeResult(GIT_ERROR)), LibGit2Exception);
+    EXPECT_NO_THROW(check(answerWith, 0, none));
+    EXPECT_EQ(failureOf([] { check(answerWith, GIT_ELOCKED, "locked"); }),
+              (Failure{GIT_ELOCKED, GIT_ERROR_NET, "locked"}));
 }
 
-TEST(GitResult, RaisesNothingBeforeItIsAsked)
-{
-    const LogCapture log;
-    const GitResult<void> result = makeResult(GIT_ERROR);
-    EXPECT_TRUE(result.has_error());
-    EXPECT_FALSE(result.has_value());
-    EXPECT_THAT(log.messages(), IsEmpty());
-}
-
-TEST(GitResult, GoesThroughThePolicyAlsoWithAnErrorOfCodeZero)
+TEST_F(GitResultTest, GoesThroughThePolicyAlsoWithAnErrorOfCodeZero)
 {
     const LogCapture log(SeverityDiagnostic);
     const GitResult<void> result = GitError();
@@ -195,40 +179,19 @@ TEST(GitResult, GoesThroughThePolicyAlsoWithAnErrorOfCodeZero)
     EXPECT_THAT(log.messages(), ElementsAre("Throwing error  (0)"));
 }
 
-TEST(GitResult, TellsThatThereIsNoValueWhenItHoldsNothing)
+TEST_F(GitResultTest, TellsThatThereIsNoValueOrNoErrorWhenItHoldsNoneOrNothing)
 {
     const LogCapture log;
-    const GitResult<void> result = Peek::emptied(makeResult(0));
-    expectBadAccess([&result] { result.value(); }, "no value", valueHook, 52);
+    const GitResult<void> nothing = Peek::emptied(makeResult(0));
+    const GitResult<const char *> value("value");
+    expectBadAccess([&] { nothing.value(); }, "no value", valueHook, 52);
+    expectBadAccess([&] { static_cast<void>(nothing.error()); }, "no error", errorHook, 60);
+    expectBadAccess([&] { static_cast<void>(value.error()); }, "no error", errorHook, 60);
     EXPECT_THAT(log.messages(), IsEmpty());
 }
 
-TEST(GitResult, GivesTheErrorItHoldsAndWritesNothing)
+TEST_F(GitErrorPolicyTest, HasHooksThatReturnForWhatTheResultHolds)
 {
-    const HermeticLibGit2 libgit2;
-    const LogCapture log;
-    const GitResult<void> result = makeResult(GIT_ITEROVER);
-    EXPECT_EQ(result.error().getCode(), GIT_ITEROVER);
-    EXPECT_THAT(log.messages(), IsEmpty());
-}
-
-TEST(GitResult, TellsThatThereIsNoErrorWhenItHoldsAValue)
-{
-    const LogCapture log;
-    const GitResult<const char *> result("value");
-    expectBadAccess([&result] { static_cast<void>(result.error()); }, "no error", errorHook, 60);
-    EXPECT_THAT(log.messages(), IsEmpty());
-}
-
-TEST(GitResult, TellsThatThereIsNoErrorWhenItHoldsNothing)
-{
-    const GitResult<void> result = Peek::emptied(makeResult(0));
-    expectBadAccess([&result] { static_cast<void>(result.error()); }, "no error", errorHook, 60);
-}
-
-TEST(GitErrorPolicy, HasHooksThatReturnForWhatTheResultHolds)
-{
-    const HermeticLibGit2 libgit2;
     const GitResult<const char *> value("value");
     const GitResult<void> failure = makeResult(GIT_ITEROVER);
     EXPECT_NO_THROW(GitErrorPolicy::wide_value_check(value));

@@ -31,43 +31,21 @@ void enable(unsigned severities)
     logger().set_enabled_severities(severities);
 }
 
-TEST(ScopeTrace, WritesItsSignatureAtEntryAndAtExit)
+TEST(ScopeTrace, WritesItsSignatureAtEntryAndAtExitAndHoldsPathAndLine)
 {
     const LogCapture log;
     {
         const ScopeTrace trace(logger(), tracedSignature, "folder/file", 12);
         EXPECT_THAT(log.records(), ElementsAre(isRecord(0x20, tracedSignature)));
+        EXPECT_STREQ(trace.getPath(), "folder/file");
+        EXPECT_EQ(trace.getLine(), 12u);
     }
     EXPECT_THAT(log.records(),
                 ElementsAre(isRecord(0x20, tracedSignature), isRecord(0x40, tracedSignature)));
 }
 
-TEST(ScopeTrace, HoldsPathAndLine)
-{
-    const ScopeTrace trace(logger(), tracedSignature, "folder/file", 12);
-    EXPECT_STREQ(trace.getPath(), "folder/file");
-    EXPECT_EQ(trace.getLine(), 12u);
-}
-
-TEST(ScopeTrace, CountsTheScopesThatAreOpen)
-{
-    const LogCapture log;
-    EXPECT_EQ(logger().scope_depth(), 0);
-    {
-        const ScopeTrace outer(logger(), "outer", "file", 1);
-        EXPECT_EQ(logger().scope_depth(), 1);
-        {
-            const ScopeTrace inner(logger(), "inner", "file", 2);
-            EXPECT_EQ(logger().scope_depth(), 2);
-        }
-        EXPECT_EQ(logger().scope_depth(), 1);
-    }
-    EXPECT_EQ(logger().scope_depth(), 0);
-    EXPECT_THAT(log.messages(), ElementsAre("outer", "inner", "inner", "outer"));
-}
-
 /// A host's output may indent each record by the count.
-TEST(ScopeTrace, CountsAfterItsEntryRecordAndBeforeItsExitRecord)
+TEST(ScopeTrace, CountsTheOpenScopesAfterTheirEntryRecordAndBeforeTheirExitRecord)
 {
     LogCapture log;
     std::vector<int> counts;
@@ -75,24 +53,11 @@ TEST(ScopeTrace, CountsAfterItsEntryRecordAndBeforeItsExitRecord)
     {
         const ScopeTrace outer(logger(), "outer", "file", 1);
         const ScopeTrace inner(logger(), "inner", "file", 2);
+        EXPECT_EQ(logger().scope_depth(), 2);
     }
     EXPECT_THAT(counts, ElementsAre(0, 1, 1, 0));
-}
-
-TEST(ScopeTrace, TellsThatAnExceptionPasses)
-{
-    const LogCapture log;
-    try
-    {
-        const ScopeTrace trace(logger(), tracedSignature, "file", 1);
-        throw std::runtime_error("passing");
-    }
-    catch (const std::runtime_error &)
-    {
-        EXPECT_EQ(logger().scope_depth(), 0);
-    }
-    EXPECT_THAT(log.messages(SeverityScopeExit),
-                ElementsAre(std::string(tracedSignature) + " [throw]"));
+    EXPECT_EQ(logger().scope_depth(), 0);
+    EXPECT_THAT(log.messages(), ElementsAre("outer", "inner", "inner", "outer"));
 }
 
 TEST(ScopeTrace, TellsNoExceptionInsideAHandler)
@@ -118,19 +83,21 @@ struct TracesItsEnd
     }
 };
 
-TEST(ScopeTrace, TellsAnExceptionThatPassesElsewhereOnTheThread)
+TEST(ScopeTrace, TellsThatAnExceptionPassesAlsoElsewhereOnTheThread)
 {
     const LogCapture log;
     try
     {
         const TracesItsEnd tracesItsEnd;
+        const ScopeTrace trace(logger(), "passed", "file", 1);
         throw std::runtime_error("passing");
     }
     catch (const std::runtime_error &)
     {
-        EXPECT_THAT(log.messages(SeverityScopeExit),
-                    ElementsAre(std::string(tracedSignature) + " [throw]"));
+        EXPECT_EQ(logger().scope_depth(), 0);
     }
+    EXPECT_THAT(log.messages(SeverityScopeExit),
+                ElementsAre("passed [throw]", std::string(tracedSignature) + " [throw]"));
 }
 
 TEST(ScopeTrace, DoesNothingWhenItsEntryIsDisabled)
@@ -145,28 +112,25 @@ TEST(ScopeTrace, DoesNothingWhenItsEntryIsDisabled)
     EXPECT_THAT(log.records(), IsEmpty());
 }
 
-TEST(ScopeTrace, StillEndsWhenItsEntryIsDisabledMeanwhile)
+TEST(ScopeTrace, CountsAndEndsAlsoWhenItsEntryIsDisabledMeanwhileOrItsExitAllTheTime)
 {
-    const LogCapture log;
+    LogCapture log;
+    const auto recordsOf = [&log](unsigned atEntry, unsigned atExit)
     {
-        const ScopeTrace trace(logger(), tracedSignature, "file", 1);
-        EXPECT_EQ(logger().scope_depth(), 1);
-        enable(SeverityScopeExit);
-    }
-    EXPECT_EQ(logger().scope_depth(), 0);
-    EXPECT_THAT(log.records(),
+        log.clear();
+        enable(atEntry);
+        {
+            const ScopeTrace trace(logger(), tracedSignature, "file", 1);
+            EXPECT_EQ(logger().scope_depth(), 1);
+            enable(atExit);
+        }
+        EXPECT_EQ(logger().scope_depth(), 0);
+        return log.records();
+    };
+    EXPECT_THAT(recordsOf(LogCapture::allSeverities, SeverityScopeExit),
                 ElementsAre(isRecord(0x20, tracedSignature), isRecord(0x40, tracedSignature)));
-}
-
-TEST(ScopeTrace, CountsWithoutARecordWhenOnlyItsExitIsDisabled)
-{
-    const LogCapture log(SeverityScopeEntry);
-    {
-        const ScopeTrace trace(logger(), tracedSignature, "file", 1);
-        EXPECT_EQ(logger().scope_depth(), 1);
-    }
-    EXPECT_EQ(logger().scope_depth(), 0);
-    EXPECT_THAT(log.records(), ElementsAre(isRecord(0x20, tracedSignature)));
+    EXPECT_THAT(recordsOf(SeverityScopeEntry, SeverityScopeEntry),
+                ElementsAre(isRecord(0x20, tracedSignature)));
 }
 
 TEST(ScopeTrace, TracesTheLoggerThatItIsGiven)

@@ -8,14 +8,14 @@
 #include <utility>
 #include <vector>
 
-#include <boost/exception/diagnostic_information.hpp>
 #include <git2/errors.h>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "error/logging/severity.hpp"
 #include "fl/i18n/convert.hpp"
 #include "support/LogCapture.hpp"
+#include "support/diagnosticText.hpp"
+#include "support/isRecord.hpp"
 #include "vclink/git/GitException.hpp"
 #include "vclink/git/messageIdentifiers.hpp"
 #include "vclink/util/exception/CancelledOperationException.hpp"
@@ -25,7 +25,9 @@ namespace vclink::git
 namespace
 {
 
+using test::isRecord;
 using test::LogCapture;
+using testing::ElementsAre;
 using testing::IsEmpty;
 using vclink::util::exception::CancelledOperationException;
 
@@ -48,20 +50,16 @@ class CallbackException : public testing::Test
     }
 };
 
-TEST_F(CallbackException, HasOneSlotAThread)
+TEST_F(CallbackException, IsMovedIntoTheOneSlotOfTheThread)
 {
     std::exception_ptr &slot = pendingCallbackException();
     EXPECT_EQ(slot, nullptr);
-    EXPECT_EQ(&pendingCallbackException(), &slot);
-}
-
-TEST_F(CallbackException, IsMovedIntoTheSlot)
-{
     std::exception_ptr exception = std::make_exception_ptr(std::runtime_error("stored"));
     const std::exception_ptr same = exception;
     storeCallbackException(std::move(exception));
     EXPECT_EQ(exception, nullptr);
-    EXPECT_EQ(pendingCallbackException(), same);
+    EXPECT_EQ(slot, same);
+    EXPECT_EQ(&pendingCallbackException(), &slot);
 }
 
 TEST_F(CallbackException, ReplacesAndReleasesAnEarlierOne)
@@ -99,82 +97,52 @@ TEST_F(CallbackException, IsParkedAsItIs)
     }
 }
 
-TEST_F(CallbackException, IsReportedWithItsDiagnosticsAndThenItsStack)
+/// Throws the exception, and gives the records of its report.
+template <class Exception>
+std::vector<test::LogRecord> recordsOfReport(const Exception &exception, unsigned severities)
 {
-    const LogCapture log;
-    std::string diagnostics;
-    std::string stack;
+    const LogCapture log(severities);
     try
     {
-        throw CancelledOperationException();
+        throw exception;
     }
-    catch (const CancelledOperationException &exception)
+    catch (...)
     {
-        diagnostics = boost::current_exception_diagnostic_information(true);
-        stack = fl::i18n::to_string(exception.getStackTrace().to_text());
         reportCallbackException();
     }
-    const auto records = log.records();
-    ASSERT_EQ(records.size(), 2u);
-    EXPECT_EQ(records[0].severity, 0x10u);
-    EXPECT_EQ(records[0].message, "Exception caught: " + diagnostics);
-    EXPECT_EQ(records[1].severity, 0x200u);
-    EXPECT_EQ(records[1].message, stack);
-    EXPECT_NE(stack, "");
     EXPECT_EQ(pendingCallbackException(), nullptr);
+    return log.records();
 }
 
-TEST_F(CallbackException, IsReportedAtEachSeverityByItself)
+auto isOf(unsigned severity)
 {
-    for (const unsigned severity : {0x10u, 0x200u})
-    {
-        const LogCapture log(severity);
-        try
-        {
-            throw std::runtime_error("told");
-        }
-        catch (const std::runtime_error &)
-        {
-            reportCallbackException();
-        }
-        const auto records = log.records();
-        ASSERT_EQ(records.size(), 1u);
-        EXPECT_EQ(records[0].severity, severity);
-    }
+    return testing::Field(&test::LogRecord::severity, severity);
+}
+
+TEST_F(CallbackException, IsReportedWithItsDiagnosticsAndThenItsStack)
+{
+    const CancelledOperationException exception;
+    const std::string stack = fl::i18n::to_string(exception.getStackTrace().to_text());
+    EXPECT_NE(stack, "");
+    EXPECT_THAT(
+        recordsOfReport(exception, LogCapture::allSeverities),
+        ElementsAre(isRecord(0x10u, "Exception caught: " + test::diagnosticTextOf(exception)),
+                    isRecord(0x200u, stack)));
+}
+
+TEST_F(CallbackException, IsReportedAtEachSeverityByItselfAndNowhereWhenNoneIsEnabled)
+{
+    const std::runtime_error exception("told");
+    EXPECT_THAT(recordsOfReport(exception, 0x10u), ElementsAre(isOf(0x10u)));
+    EXPECT_THAT(recordsOfReport(exception, 0x200u), ElementsAre(isOf(0x200u)));
+    EXPECT_THAT(recordsOfReport(exception, ~0x210u), IsEmpty());
 }
 
 TEST_F(CallbackException, ThatReportsItsStackForItsTextDoesSoBeforeItsOwnRecord)
 {
-    const LogCapture log;
-    try
-    {
-        throw GitException(shared_vclink::git::HasConflicts());
-    }
-    catch (const GitException &)
-    {
-        reportCallbackException();
-    }
-    std::vector<unsigned> severities;
-    for (const auto &record : log.records())
-    {
-        severities.push_back(record.severity);
-    }
-    EXPECT_THAT(severities, testing::ElementsAre(0x200u, 0x10u, 0x200u));
-}
-
-TEST_F(CallbackException, IsReportedNowhereWhenNothingIsEnabled)
-{
-    const LogCapture log(~(SeverityException | SeverityStackTrace));
-    try
-    {
-        throw std::runtime_error("untold");
-    }
-    catch (const std::runtime_error &)
-    {
-        static_cast<void>(parkCallbackException());
-    }
-    EXPECT_THAT(log.messages(), IsEmpty());
-    EXPECT_NE(pendingCallbackException(), nullptr);
+    EXPECT_THAT(recordsOfReport(GitException(shared_vclink::git::HasConflicts()),
+                                LogCapture::allSeverities),
+                ElementsAre(isOf(0x200u), isOf(0x10u), isOf(0x200u)));
 }
 
 } // namespace

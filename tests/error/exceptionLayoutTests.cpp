@@ -1,12 +1,12 @@
 // SPDX-License-Identifier: MIT
 // The layout of the exceptions, which hosts that were built apart count on.
-#include <algorithm>
 #include <cstddef>
 #include <cstring>
 #include <string>
 #include <type_traits>
 #include <vector>
 
+#include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include "error/VirtualTable.hpp"
@@ -33,6 +33,11 @@ using shared_vclink::git::MergeFailed;
 using test::offsetIn;
 using test::slotOf;
 using test::virtualTableOf;
+using testing::AnyOf;
+using testing::Each;
+using testing::ElementsAre;
+using testing::IsSupersetOf;
+using testing::Le;
 using vclink::exception::SourceControlException;
 using HasConflictsException = TagException<HasConflicts>;
 
@@ -72,9 +77,7 @@ std::vector<std::size_t> differences(const std::vector<const void *> &one,
     for (std::size_t slot = 0; slot < one.size(); ++slot)
     {
         if (one[slot] != two[slot])
-        {
             different.push_back(slot);
-        }
     }
     return different;
 }
@@ -125,34 +128,18 @@ TEST(ExceptionLayout, HasTheSameOrderOfSlotsInEveryClass)
     expectOrderOfSlots<HasConflictsException>();
 }
 
-TEST(ExceptionLayout, OfLibGit2ExceptionOverridesCloneRethrowAndTheDestructors)
+TEST(ExceptionLayout, OverridesAndInheritsTheseSlots)
 {
-    const GitException base{HasConflicts()};
-    const LibGit2Exception derived{GitError()};
-    EXPECT_EQ(differences(virtualTableOf(base, slots), virtualTableOf(derived, slots)),
-              (std::vector<std::size_t>{0, 1, 2, 3}));
-}
-
-TEST(ExceptionLayout, OfGitExceptionInheritsTheConversions)
-{
-    const GitException exception{HasConflicts()};
-    EXPECT_EQ(differences(virtualTableOf(Inheriting(), slots), virtualTableOf(exception, slots)),
-              (std::vector<std::size_t>{0, 1, 2, 3, 4, 8, 9, 10}));
-}
-
-TEST(ExceptionLayout, OfATagExceptionInheritsTheTextsToo)
-{
-    const HasConflictsException exception(HasConflicts(), SourceControlException{});
-    const auto different =
-        differences(virtualTableOf(Inheriting(), slots), virtualTableOf(exception, slots));
-    for (const std::size_t own : {0u, 1u, 2u, 3u, 8u, 10u})
-    {
-        EXPECT_EQ(std::count(different.begin(), different.end(), own), 1) << own;
-    }
-    for (const std::size_t inherited : {5u, 6u, 7u, 9u})
-    {
-        EXPECT_EQ(std::count(different.begin(), different.end(), inherited), 0) << inherited;
-    }
+    const auto inheriting = virtualTableOf(Inheriting(), slots);
+    const auto ofGit = virtualTableOf(GitException{HasConflicts()}, slots);
+    const auto ofLibGit2 = virtualTableOf(LibGit2Exception{GitError()}, slots);
+    const auto ofTag =
+        virtualTableOf(HasConflictsException(HasConflicts(), SourceControlException{}), slots);
+    EXPECT_THAT(differences(ofGit, ofLibGit2), ElementsAre(0, 1, 2, 3));
+    EXPECT_THAT(differences(inheriting, ofGit), ElementsAre(0, 1, 2, 3, 4, 8, 9, 10));
+    // Whether what() is its own is the host's affair.
+    EXPECT_THAT(differences(inheriting, ofTag), IsSupersetOf({0, 1, 2, 3, 8, 10}));
+    EXPECT_THAT(differences(inheriting, ofTag), Each(AnyOf(Le(4), 8, 10)));
 }
 
 template <class Exception> void expectOrderOfBases(const Exception &exception)
@@ -178,28 +165,20 @@ TEST(ExceptionLayout, OfARecordingExceptionHoldsTextThenFrames)
               static_cast<std::ptrdiff_t>(sizeof(std::exception) + sizeof(ustring)));
 }
 
-TEST(ExceptionLayout, OfGitExceptionEndsWithTheHolderAndTheAddedText)
+TEST(ExceptionLayout, EndsWithWhatTheClassAdds)
 {
-    const GitException exception{HasConflicts()};
+    const GitException git{HasConflicts()};
     const std::size_t holder = sizeof(GitException) - sizeof(ustring) - sizeof(GenericMsgIDHolder);
     const void *held = nullptr;
     static_assert(sizeof(GenericMsgIDHolder) == sizeof(held));
-    std::memcpy(&held, reinterpret_cast<const char *>(&exception) + holder, sizeof(held));
-    EXPECT_EQ(held, &exception.GetBaseMsgIDObj());
-}
-
-TEST(ExceptionLayout, OfLibGit2ExceptionEndsWithTheFailure)
-{
-    const LibGit2Exception exception{GitError()};
-    EXPECT_EQ(offsetIn(exception, exception.getError()),
+    std::memcpy(&held, reinterpret_cast<const char *>(&git) + holder, sizeof(held));
+    EXPECT_EQ(held, &git.GetBaseMsgIDObj());
+    const LibGit2Exception libGit2{GitError()};
+    EXPECT_EQ(offsetIn(libGit2, libGit2.getError()),
               static_cast<std::ptrdiff_t>(sizeof(GitException)));
     EXPECT_EQ(sizeof(LibGit2Exception), sizeof(GitException) + sizeof(GitError));
-}
-
-TEST(ExceptionLayout, OfATagExceptionEndsWithTheIdentifierAndItsText)
-{
-    const HasConflictsException exception(HasConflicts(), SourceControlException{});
-    EXPECT_EQ(static_cast<std::size_t>(offsetIn(exception, exception.GetBaseMsgIDObj())),
+    const HasConflictsException tag(HasConflicts(), SourceControlException{});
+    EXPECT_EQ(static_cast<std::size_t>(offsetIn(tag, tag.GetBaseMsgIDObj())),
               sizeof(HasConflictsException) - sizeof(std::string) - sizeof(BaseMsgID));
 }
 

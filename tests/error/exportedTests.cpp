@@ -4,18 +4,20 @@
 #include <filesystem>
 #include <fstream>
 #include <memory>
+#include <set>
 #include <string>
 #include <typeinfo>
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include "error/exceptions.hpp"
 #include "error/raiser.hpp"
 #include "fl/filesystem/path.hpp"
-#include "fl/i18n/VkLocale.hpp"
 #include "fl/i18n/convert.hpp"
 #include "foundation/core/except/Exception.hpp"
 #include "support/GitFixture.hpp"
+#include "support/LocaleOfTheProcess.hpp"
 #include "support/LogCapture.hpp"
 #include "support/TestInteractor.hpp"
 #include "support/text.hpp"
@@ -25,7 +27,6 @@
 #include "vclink/git/GitOptionsFactory.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
 #include "vclink/git/messageIdentifiers.hpp"
-#include "vclink_host/locale.hpp"
 
 namespace
 {
@@ -62,14 +63,9 @@ class Exported : public vclink::test::GitFixture
 
 TEST_F(Exported, FailureOfAProbeIsCaughtAsEachOfItsClasses)
 {
-    const upath broken = brokenFolder();
-    EXPECT_THROW(factory.isAdapterFor(broken), LibGit2Exception);
-    EXPECT_THROW(factory.isAdapterFor(broken), GitException);
-    EXPECT_THROW(factory.isAdapterFor(broken), IMsgIDException);
-    EXPECT_THROW(factory.isAdapterFor(broken), IUserException);
-    EXPECT_THROW(factory.isAdapterFor(broken), SourceControlException);
-    EXPECT_THROW(factory.isAdapterFor(broken), boost::exception);
-    EXPECT_THROW(factory.isAdapterFor(broken), std::exception);
+    vclink::test::expectCaughtAs<LibGit2Exception, GitException, IMsgIDException, IUserException,
+                                 SourceControlException, boost::exception, std::exception>(
+        [this, broken = brokenFolder()] { factory.isAdapterFor(broken); });
 }
 
 TEST_F(Exported, FailureTellsWhatLibGit2Said)
@@ -106,16 +102,14 @@ TEST_F(Exported, FailureIsToldInTheLocaleOfTheMomentOfAsking)
     ASSERT_NE(failure, nullptr);
     const GitException &kept = *failure;
     EXPECT_EQ(typeid(kept), typeid(LibGit2Exception));
-    vclink_host::setGlobalLocale(fl::i18n::VkLocale("de"));
-    const ustring german = failure->GetUnicodeMessageTxt();
-    vclink_host::setGlobalLocale(fl::i18n::VkLocale("ja"));
-    const ustring japanese = failure->GetUnicodeMessageTxt();
-    vclink_host::setGlobalLocale(fl::i18n::VkLocale("en"));
-    const ustring english = failure->GetUnicodeMessageTxt();
-    EXPECT_NE(german, english);
-    EXPECT_NE(japanese, english);
-    EXPECT_NE(japanese, german);
-    EXPECT_EQ(failure->what(), fl::i18n::to_string(english));
+    std::set<ustring> texts;
+    for (const char *const language : {"de", "ja", "en"})
+    {
+        const vclink::test::LocaleOfTheProcess locale(language);
+        texts.insert(failure->GetUnicodeMessageTxt());
+        EXPECT_EQ(failure->what(), fl::i18n::to_string(failure->GetUnicodeMessageTxt()));
+    }
+    EXPECT_EQ(texts.size(), 3U);
 }
 
 TEST_F(Exported, FailureOfAnAdapterIsCaughtByItsClass)
@@ -139,11 +133,14 @@ TEST_F(Exported, LibraryLogsUnderItsNameToTheHostsSinks)
     EXPECT_EQ(records[3].message, "Unregister merge driver: *");
 }
 
-TEST_F(Exported, TagExceptionIsCaughtByItsIdentifier)
+TEST_F(Exported, TagExceptionIsCaughtByItsIdentifierAndAsAFailureOfSourceControl)
 {
+    const auto raise = [] { vclink::test::raiseAlreadyAdded(u"a\nb"); };
+    vclink::test::expectCaughtAs<SourceControlException, IMsgIDException, boost::exception>(raise);
     try
     {
-        vclink::test::raiseAlreadyAdded(u"a\nb");
+        raise();
+        ADD_FAILURE() << "nothing was raised";
     }
     catch (const TagException<HasConflicts> &)
     {
@@ -154,16 +151,7 @@ TEST_F(Exported, TagExceptionIsCaughtByItsIdentifier)
         EXPECT_EQ(typeid(exception), typeid(TagException<AlreadyAdded>));
         EXPECT_EQ(exception.GetBaseMsgIDObj().getKey(), "AlreadyAdded");
         EXPECT_NE(exception.GetUnicodeMessageTxt().find(u"a\nb"), ustring::npos);
-        return;
     }
-    ADD_FAILURE() << "nothing was raised";
-}
-
-TEST_F(Exported, TagExceptionIsCaughtAsAFailureOfSourceControl)
-{
-    EXPECT_THROW(vclink::test::raiseAlreadyAdded(u"a"), SourceControlException);
-    EXPECT_THROW(vclink::test::raiseAlreadyAdded(u"a"), IMsgIDException);
-    EXPECT_THROW(vclink::test::raiseAlreadyAdded(u"a"), boost::exception);
 }
 
 TEST_F(Exported, NestedTagExceptionGivesItsCause)
@@ -186,42 +174,22 @@ TEST_F(Exported, NestedTagExceptionGivesItsCause)
     }
 }
 
+struct OwnFactory : vclink::git::GitOptionsFactory
+{
+    using GitOptionsFactory::GitOptionsFactory;
+    MOCK_METHOD(vclink::git::CloneOptions, makeCloneOptions, (), (override));
+    MOCK_METHOD(vclink::git::FetchOptions, makeFetchOptions, (), (override));
+    MOCK_METHOD(vclink::git::ProxyOptions, makeProxyOptions, (), (override));
+    MOCK_METHOD(vclink::git::PushOptions, makePushOptions, (), (override));
+    MOCK_METHOD(vclink::git::CheckoutOptions, makeCheckoutOptions, (), (override));
+    MOCK_METHOD(vclink::git::StatusOptions, makeStatusOptions, (), (override));
+    MOCK_METHOD(vclink::git::MergeOptions, makeMergeOptions, (), (override));
+};
+
 TEST_F(Exported, OptionsFactoryCanBeMadeAndBeDerivedFrom)
 {
-    struct OwnFactory : vclink::git::GitOptionsFactory
-    {
-        using GitOptionsFactory::GitOptionsFactory;
-        vclink::git::CloneOptions makeCloneOptions() override
-        {
-            return {};
-        }
-        vclink::git::FetchOptions makeFetchOptions() override
-        {
-            return {};
-        }
-        vclink::git::ProxyOptions makeProxyOptions() override
-        {
-            return {};
-        }
-        vclink::git::PushOptions makePushOptions() override
-        {
-            return {};
-        }
-        vclink::git::CheckoutOptions makeCheckoutOptions() override
-        {
-            return {};
-        }
-        vclink::git::StatusOptions makeStatusOptions() override
-        {
-            return {};
-        }
-        vclink::git::MergeOptions makeMergeOptions() override
-        {
-            return {};
-        }
-    };
     const auto interactor = std::make_shared<TestInteractor>();
-    OwnFactory own(interactor);
+    testing::NiceMock<OwnFactory> own(interactor);
     EXPECT_EQ(own.getInteractor(), interactor);
     const auto given = vclink::git::GitOptionsFactory::makeUninitialized(interactor);
     EXPECT_EQ(given->makePushOptions().packbuilderParallelism,

@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include <gmock/gmock.h>
+
 #include "error/errorUtil/libgit2Errors.hpp"
 #include "vclink/git/GitError.hpp"
 
@@ -12,6 +14,14 @@ inline git::GitError makeError(int code, int errorClass, const char *text)
 {
     git_error_set_str(errorClass, text);
     return git::GitError(code);
+}
+
+/// Matches an error with this code, class and text.
+inline auto isError(int code, int errorClass, const ustring &text)
+{
+    return testing::AllOf(testing::Property(&git::GitError::getCode, code),
+                          testing::Property(&git::GitError::getErrorClass, errorClass),
+                          testing::Property(&git::GitError::getMessage, text));
 }
 
 } // namespace vclink::test

@@ -28,47 +28,37 @@ using test::LocaleOfTheProcess;
 
 static_assert(std::is_same_v<MsgArgument, boost::variant<long, std::string, ustring>>);
 
-void expectMessage(const BaseMsgID &message, const std::string &key,
-                   const std::vector<MsgArgument> &arguments)
-{
-    EXPECT_EQ(message.getCatalogue(), "shared_vclink:git");
-    EXPECT_EQ(message.getKey(), key);
-    EXPECT_TRUE(message.getArguments() == arguments) << key;
-}
-
 const ustring report = u"a/Z\u00FCrich\nb/\u6771\u4EAC";
 
-/// All messages, with arguments of the types that they are raised with.
-std::vector<BaseMsgID> allMessages()
+/// A message, its key and the arguments that it is raised with.
+struct Row
 {
-    return {LibGit2Error(-3, 7, report),
-            MergeFailed(std::string("topic")),
-            HasConflicts(),
-            UnableToMergeBadRepositoryState(),
-            MergePreferenceFastForward(),
-            AlreadyAdded(report),
-            NoFilesToRemove(),
-            Conflicted(report),
-            NoUserName(),
-            InvalidGitAttributeValue("value"),
-            ProgressCallbackCheckoutMessage(report)};
-}
+    BaseMsgID message;
+    std::string key;
+    std::vector<MsgArgument> arguments;
+};
+const Row rows[] = {
+    {LibGit2Error(-3, 7, report), "LibGit2Error", {-3L, 7L, report}},
+    {MergeFailed(std::string("topic")), "MergeFailed", {std::string("topic")}},
+    {HasConflicts(), "HasConflicts", {}},
+    {UnableToMergeBadRepositoryState(), "UnableToMergeBadRepositoryState", {}},
+    {MergePreferenceFastForward(), "MergePreferenceFastForward", {}},
+    {AlreadyAdded(report), "AlreadyAdded", {report}},
+    {NoFilesToRemove(), "NoFilesToRemove", {}},
+    {Conflicted(report), "Conflicted", {report}},
+    {NoUserName(), "NoUserName", {}},
+    {InvalidGitAttributeValue("value"), "InvalidGitAttributeValue", {std::string("value")}},
+    {ProgressCallbackCheckoutMessage(report), "ProgressCallbackCheckoutMessage", {report}},
+};
 
 TEST(MessageIdentifiers, AreNamedLikeTheirClassesAndKeepTheirArguments)
 {
-    expectMessage(LibGit2Error(-3, 7, report), "LibGit2Error", {-3L, 7L, report});
-    expectMessage(MergeFailed(std::string("topic")), "MergeFailed", {std::string("topic")});
-    expectMessage(HasConflicts(), "HasConflicts", {});
-    expectMessage(UnableToMergeBadRepositoryState(), "UnableToMergeBadRepositoryState", {});
-    expectMessage(MergePreferenceFastForward(), "MergePreferenceFastForward", {});
-    expectMessage(AlreadyAdded(report), "AlreadyAdded", {report});
-    expectMessage(NoFilesToRemove(), "NoFilesToRemove", {});
-    expectMessage(Conflicted(report), "Conflicted", {report});
-    expectMessage(NoUserName(), "NoUserName", {});
-    expectMessage(InvalidGitAttributeValue("value"), "InvalidGitAttributeValue",
-                  {std::string("value")});
-    expectMessage(ProgressCallbackCheckoutMessage(report), "ProgressCallbackCheckoutMessage",
-                  {report});
+    for (const auto &[message, key, arguments] : rows)
+    {
+        EXPECT_EQ(message.getCatalogue(), "shared_vclink:git");
+        EXPECT_EQ(message.getKey(), key);
+        EXPECT_TRUE(message.getArguments() == arguments) << key;
+    }
 }
 
 TEST(MessageIdentifiers, KeepATextOfEachTypeInItsOwnType)
@@ -90,40 +80,31 @@ TEST(MessageIdentifiers, KeepCopiesOfTheirTexts)
     EXPECT_EQ(boost::get<std::string>(message.getArguments()[0]), "before");
 }
 
-TEST(MessageIdentifiers, HaveATextOfTheirOwnInEveryLanguage)
+TEST(MessageIdentifiers, HaveATextOfTheirOwnWithTheirArgumentsInEveryLanguage)
 {
     std::set<ustring> texts;
-    for (const char *const language : {"en", "de", "ja"})
+    for (const std::string language : {"en", "de", "ja"})
     {
-        for (const BaseMsgID &message : allMessages())
+        for (const Row &row : rows)
         {
-            const ustring text = fl::i18n::MessageCatalog::get_message(message, VkLocale(language));
-            EXPECT_TRUE(texts.insert(text).second) << language << ' ' << message.getKey();
-            EXPECT_EQ(text.find(u"shared_vclink"), ustring::npos)
-                << language << ' ' << message.getKey();
-            EXPECT_EQ(text.find(u'%'), ustring::npos) << language << ' ' << message.getKey();
+            SCOPED_TRACE(language + ' ' + row.key);
+            const ustring text =
+                fl::i18n::MessageCatalog::get_message(row.message, VkLocale(language));
+            EXPECT_TRUE(texts.insert(text).second);
+            EXPECT_EQ(text.find(u"shared_vclink"), ustring::npos);
+            EXPECT_EQ(text.find(u'%'), ustring::npos);
         }
+        const LocaleOfTheProcess locale(language);
+        const auto expectShown = [](const GitException &exception, const ustring &argument)
+        { EXPECT_NE(exception.GetUnicodeMessageTxt().find(argument), ustring::npos); };
+        const GitException failure(LibGit2Error(-1234, 5678, report));
+        expectShown(failure, u"-1234");
+        expectShown(failure, u"5678");
+        expectShown(failure, report);
+        expectShown(GitException(MergeFailed("topic")), u"topic");
+        expectShown(GitException(Conflicted(report)), report);
     }
     EXPECT_EQ(texts.size(), 33u);
-}
-
-TEST(MessageIdentifiers, HaveTheirArgumentsInTheirTexts)
-{
-    for (const char *const language : {"en", "de", "ja"})
-    {
-        const LocaleOfTheProcess locale(language);
-        const ustring failure =
-            GitException(LibGit2Error(-1234, 5678, report)).GetUnicodeMessageTxt();
-        EXPECT_NE(failure.find(u"-1234"), ustring::npos) << language;
-        EXPECT_NE(failure.find(u"5678"), ustring::npos) << language;
-        EXPECT_NE(failure.find(report), ustring::npos) << language;
-        EXPECT_NE(GitException(MergeFailed("topic")).GetUnicodeMessageTxt().find(u"topic"),
-                  ustring::npos)
-            << language;
-        EXPECT_NE(GitException(Conflicted(report)).GetUnicodeMessageTxt().find(report),
-                  ustring::npos)
-            << language;
-    }
 }
 
 /// Expects that the exception's text is that of the locale in which it is asked for.
