@@ -8,17 +8,18 @@
 namespace vclink::git
 {
 
-/// What a new branch is to be. A plain value.
+/// Name and start of a new branch. A plain value.
 class VCLINK_GIT_EXPORT BranchParameters
 {
   public:
+    /// Creates the value.
     /// @param name the branch's short name, UTF-8
-    /// @param startPoint the name of a reference that points at a commit itself, UTF-8
+    /// @param startPoint the name of a reference that points directly to a commit, UTF-8
     BranchParameters(const std::string &name, const std::string &startPoint);
 
-    /// The branch's short name.
+    /// Returns the branch's short name.
     std::string getName() const;
-    /// The name of the reference that it begins at.
+    /// Returns the name of the reference at which the branch starts.
     std::string getStartPoint() const;
 
   private:

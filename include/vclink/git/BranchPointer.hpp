@@ -8,24 +8,25 @@
 namespace vclink::git
 {
 
-/// The name of a branch. A plain value, with no tie to the repository.
+/// The name of a branch. A plain value, independent of the repository.
 class VCLINK_GIT_EXPORT BranchPointer
 {
   public:
+    /// Copies the name.
     /// @param name UTF-8
     explicit BranchPointer(const std::string &name);
-    /// The same, without a copy.
+    /// Moves the name.
     explicit BranchPointer(std::string &&name) noexcept;
 
-    /// The name, UTF-8: of a list the full name of the reference, of BranchManager's
-    /// getCurrentBranch() the short one.
+    /// Returns the name, UTF-8. The lists of BranchManager have full names of references, its
+    /// getCurrentBranch() returns a short name.
     std::string getName() const;
 
   private:
     std::string name_;
 };
 
-/// Whether the names are the same bytes.
+/// Returns true if the names have the same bytes.
 VCLINK_GIT_EXPORT bool operator==(const BranchPointer &left, const BranchPointer &right);
 VCLINK_GIT_EXPORT bool operator!=(const BranchPointer &left, const BranchPointer &right);
 

@@ -8,13 +8,13 @@
 namespace vclink::git
 {
 
-/// What a checkout is told. A plain value.
+/// Options for a checkout. A plain value.
 class VCLINK_GIT_EXPORT CheckoutOptions
 {
   public:
     CheckoutOptions();
 
-    /// libgit2's git_checkout_strategy_t flags, in the low 32 bits. GIT_CHECKOUT_SAFE at the start.
+    /// libgit2's git_checkout_strategy_t flags, in the low 32 bits. GIT_CHECKOUT_SAFE by default.
     std::uint64_t checkoutStrategy;
 };
 

@@ -12,19 +12,19 @@
 namespace vclink::git
 {
 
-/// What a clone is told. A plain value.
+/// Options for a clone. A plain value.
 class VCLINK_GIT_EXPORT CloneOptions
 {
   public:
     CloneOptions();
 
-    /// Whether to make a repository without a working tree; false at the start.
+    /// True to create a repository without a working tree. False by default.
     bool bare;
-    /// The branch to check out, UTF-8; the remote's default branch when empty.
+    /// The branch to check out, UTF-8. The remote's default branch if empty.
     boost::optional<std::string> checkoutBranch;
-    /// For the files.
+    /// Options for the files.
     CheckoutOptions checkoutOptions;
-    /// For the transfer.
+    /// Options for the transfer.
     FetchOptions fetchOptions;
 };
 

@@ -7,13 +7,13 @@
 namespace vclink::git
 {
 
-/// What a fetch is told. A plain value.
+/// Options for a fetch. A plain value.
 class VCLINK_GIT_EXPORT FetchOptions
 {
   public:
     FetchOptions();
 
-    /// For the connection.
+    /// Options for the connection.
     ProxyOptions proxyOptions;
 };
 

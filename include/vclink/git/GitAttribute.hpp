@@ -10,7 +10,7 @@
 namespace vclink::git
 {
 
-/// What Git's attribute files say of one attribute for one file. A plain value.
+/// The value of one Git attribute for one file. A plain value.
 class VCLINK_GIT_EXPORT GitAttribute
 {
   public:
@@ -25,26 +25,26 @@ class VCLINK_GIT_EXPORT GitAttribute
     /// `name=value`
     struct Value
     {
-        /// The text behind the equals sign.
+        /// The text after the equals sign.
         ustring value;
     };
-    /// Nothing says anything, or `!name`.
+    /// `!name`, or no attribute file names it.
     struct Unspecified
     {
     };
 
     /// The attribute's name.
     ustring name;
-    /// Which of the four it is.
+    /// One of the four kinds.
     std::variant<Set, Unset, Value, Unspecified> attributeValue;
 };
 
-/// Whether name, alternative and, of a value, the text are the same.
+/// Returns true if name, kind and (for values) text are equal.
 VCLINK_GIT_EXPORT bool operator==(const GitAttribute &left, const GitAttribute &right);
 VCLINK_GIT_EXPORT bool operator!=(const GitAttribute &left, const GitAttribute &right);
 
-/// The attribute as it stands in a line of an attribute file, UTF-8: "name", "-name", "name=value"
-/// or "!name".
+/// Returns the attribute as it is written in an attribute file, UTF-8: "name", "-name",
+/// "name=value" or "!name".
 /// @throws std::bad_alloc
 VCLINK_GIT_EXPORT std::string serialize(const GitAttribute &attribute);
 

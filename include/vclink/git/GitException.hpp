@@ -13,40 +13,42 @@
 namespace vclink::git
 {
 
-/// A failure told by a message of the catalogue "shared_vclink:git", with an optional added text.
+/// Reports a failure by a message of the catalogue "shared_vclink:git", with an optional added
+/// text.
 ///
-/// The text is produced when it is asked for, in the process's locale of that moment. The stack is
-/// recorded when the exception is made. An object belongs to one thread at a time.
+/// The text is in the process's locale current when the text is requested. The stack is recorded
+/// when the exception is created. An object belongs to one thread at a time.
 class VCLINK_GIT_EXPORT GitException : public foundation::core::except::IMsgIDException,
                                        public vclink::exception::SourceControlException
 {
   public:
-    /// @param message is copied, its arguments with it
-    /// @param addedText follows the message's text on a line of its own; may be empty
+    /// Copies the message and its arguments.
+    /// @param message the message
+    /// @param addedText follows the message's text on a line of its own; can be empty
     GitException(const resource_core::BaseMsgID &message, const ustring &addedText);
-    /// Without an added text.
+    /// Copies the message, without an added text.
     explicit GitException(const resource_core::BaseMsgID &message);
-    /// A deep copy, the recorded stack included.
+    /// Makes a deep copy, including the recorded stack.
     GitException(const GitException &other);
-    /// Leaves `other` without a message; only destruction makes sense of it then.
+    /// Leaves `other` without a message: the moved-from object may only be destroyed.
     GitException(GitException &&other);
     GitException &operator=(const GitException &) = delete;
     ~GitException() noexcept override;
 
-    /// A copy on the heap, which the caller owns.
+    /// Returns a copy on the heap. The caller owns it.
     [[nodiscard]] const GitException *clone() const override;
     /// Throws a copy of this class.
     void rethrow() const override;
 
-    /// The text in UTF-8, as foundation::core::except::IException::what() gives it. Reports the
-    /// stack to the log first, where stack traces are enabled.
+    /// Returns the text in UTF-8, as foundation::core::except::IException::what() does. Logs the
+    /// stack first if stack traces are enabled.
     const char *what() const noexcept override;
 
-    /// catalogue + ":" + key of the message.
+    /// Returns catalogue + ":" + key of the message.
     std::string GetID() const override;
-    /// The message's text; if there is an added text, a line feed and the added text after it.
+    /// Returns the message's text, followed by a line feed and the added text if there is one.
     ustring GetUnicodeMessageTxt() const override;
-    /// The message, which lives as long as the exception.
+    /// Returns the message, which lives as long as the exception.
     /// @throws resource_core::GenericMsgIDHolder::EmptyGenericMsgIDHolder after a move
     const resource_core::BaseMsgID &GetBaseMsgIDObj() const override;
 

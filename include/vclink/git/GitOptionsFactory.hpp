@@ -16,41 +16,43 @@
 namespace vclink::git
 {
 
-/// Makes the option values that the operations run with. A host that wants other values derives
-/// from it. The order of the virtual operations is binding. The two factories given here hold
-/// nothing that changes, and raise nothing but std::bad_alloc.
+/// Creates the option values of the operations. A host that needs other values derives from it. The
+/// order of the virtual operations is binding. The two factories provided here hold nothing that
+/// changes, and throw only std::bad_alloc.
 class VCLINK_GIT_EXPORT GitOptionsFactory
 {
   public:
+    /// Keeps the interactor.
     /// @param interactor shared for the factory's life
     explicit GitOptionsFactory(std::shared_ptr<ApplicationInteractor> interactor);
     GitOptionsFactory(const GitOptionsFactory &) = delete;
     GitOptionsFactory &operator=(const GitOptionsFactory &) = delete;
     virtual ~GitOptionsFactory();
 
-    /// A factory that leaves nested values as their outer value's constructor made them.
+    /// Creates a factory that leaves nested values as the constructor of the outer value sets them.
     [[nodiscard]] static std::unique_ptr<GitOptionsFactory>
     makeUninitialized(std::shared_ptr<ApplicationInteractor> interactor);
-    /// A factory that composes nested values of their own defaults; what adapters run with.
+    /// Creates the factory that adapters use. It sets each nested value to what its operation for
+    /// that value returns.
     [[nodiscard]] static std::unique_ptr<GitOptionsFactory>
     makeDefault(std::shared_ptr<ApplicationInteractor> interactor);
 
-    /// For a clone.
+    /// Returns the options for a clone.
     virtual CloneOptions makeCloneOptions() = 0;
-    /// For a fetch.
+    /// Returns the options for a fetch.
     virtual FetchOptions makeFetchOptions() = 0;
-    /// For a listing of a remote, and what others nest.
+    /// Returns the options for a listing of a remote, and those that other values nest.
     virtual ProxyOptions makeProxyOptions() = 0;
-    /// For a push.
+    /// Returns the options for a push.
     virtual PushOptions makePushOptions() = 0;
-    /// For a checkout.
+    /// Returns the options for a checkout.
     virtual CheckoutOptions makeCheckoutOptions() = 0;
-    /// For a walk over the states of files.
+    /// Returns the options for a walk over the states of files.
     virtual StatusOptions makeStatusOptions() = 0;
-    /// For a merge.
+    /// Returns the options for a merge.
     virtual MergeOptions makeMergeOptions() = 0;
 
-    /// A further share of the interactor.
+    /// Returns the interactor.
     std::shared_ptr<ApplicationInteractor> getInteractor() const;
 
   private:

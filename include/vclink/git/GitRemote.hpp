@@ -13,29 +13,31 @@
 namespace vclink::git
 {
 
-/// One remote of a working copy, by its name. Each operation opens the repository of the adapter,
-/// looks the remote up in its configuration, connects, runs to its end on the calling thread and
-/// keeps nothing: there is no connection between two calls. For one thread at a time, as its
-/// adapter.
+/// Fetches from, pushes to and lists one remote of a working copy.
 ///
-/// Access: plain paths, file://, git://, http://, https:// and ssh:// as libgit2 has them. The only
-/// credentials are the keys of the ssh agent that SSH_AUTH_SOCK names, with the user that the URL
-/// names, and a password that stands in the URL; nobody is asked for anything. No proxy is used.
-/// Every certificate and every host key is accepted. There is no time limit: a remote that stays
-/// silent keeps the operation waiting.
+/// Each operation opens the repository of the adapter, looks up the remote in its configuration,
+/// connects, runs to its end on the calling thread and keeps nothing: no connection stays open
+/// between two calls. Use it on one thread at a time, the adapter's. The order of the operations is
+/// binding.
 ///
-/// Each operation throws LibGit2Exception, with libgit2's text, when a call to libgit2 fails: a
-/// name that the repository does not know, a remote that can't be reached or that refuses access.
-/// A name or refspec with a NUL character is refused with GIT_EINVALIDSPEC before anything is
-/// opened.
-/// Meanwhile SIGPIPE is blocked for the calling thread, so that a broken connection is such a
-/// failure too. The order of the operations is binding.
+/// Every certificate and every host key is accepted: anyone who intercepts the connection can read
+/// and modify it. There is no time limit: a silent remote blocks the operation. Plain paths,
+/// file://, git://, http://, https:// and ssh:// work as in libgit2. The only credentials are the
+/// keys of the ssh agent that SSH_AUTH_SOCK names, with the user in the URL, and a password in the
+/// URL. Nobody is prompted. No proxy is used.
+///
+/// Each operation throws LibGit2Exception with libgit2's text if a call to libgit2 fails, for
+/// example if the repository does not have the remote, or if the remote cannot be reached or
+/// refuses access. A name or refspec with a NUL character throws with GIT_EINVALIDSPEC before
+/// anything is opened. SIGPIPE is blocked for the calling thread during an operation, so a broken
+/// connection throws too.
 class VCLINK_GIT_EXPORT GitRemote
 {
   public:
-    /// Nothing is looked up yet: a name that is wrong shows at the first operation.
+    /// Creates an object for a remote. Looks up nothing: if the name is wrong, the first operation
+    /// fails.
     /// @param name the remote's name, UTF-8, e.g. "origin"
-    /// @param adapter one that GitAdapterFactory has made; must outlive the object
+    /// @param adapter must be from GitAdapterFactory, and must outlive the object
     /// @throws std::bad_cast for any other adapter
     [[nodiscard]] static std::unique_ptr<GitRemote> create(const std::string &name,
                                                            vclink::CMAdapter &adapter);
@@ -45,33 +47,37 @@ class VCLINK_GIT_EXPORT GitRemote
     GitRemote &operator=(const GitRemote &) = delete;
     virtual ~GitRemote();
 
-    /// Takes objects from the remote and moves the references that the refspecs name,
-    /// remote-tracking branches as a rule. Tags come along that point at what was taken, of a
-    /// repository on this machine all of them; branches that the remote has deleted stay unless its
-    /// `prune` is configured. Working tree, index and local branches stay as they are, unless a
-    /// refspec names one. After a failure or a cancellation objects may have been taken, and
-    /// references moved in part. A request for cancellation that ended a fetch still stops the next
-    /// checkout of the adapter at its first file. git_remote_fetch.
-    /// @param refspecs taken as they stand, e.g. "+refs/heads/*:refs/remotes/origin/*"; an empty
-    /// list means those that are configured
-    /// @throws vclink::util::exception::CancelledOperationException when the application asked for
-    /// it before, or while objects come in or the remote talks
+    /// Downloads objects from the remote and moves the references that the refspecs name, usually
+    /// remote-tracking branches.
+    ///
+    /// Also downloads the tags that point to downloaded objects, and all tags of a repository on
+    /// this machine. Keeps branches that the remote has deleted, unless its `prune` is configured.
+    /// Does not change the working tree, the index and local branches, unless a refspec names one.
+    ///
+    /// After a failure or a cancellation some objects may have been downloaded and some references
+    /// moved. A cancellation request that ended a fetch also stops the next checkout of the adapter
+    /// at its first file. git_remote_fetch.
+    /// @param refspecs used unchanged, e.g. "+refs/heads/*:refs/remotes/origin/*"; an empty list
+    /// means the configured ones
+    /// @throws vclink::util::exception::CancelledOperationException if the application requested it
+    /// before, or while objects arrive or the remote sends messages
     virtual void fetch(const std::vector<ustring> &refspecs) = 0;
 
-    /// Gives objects to the remote and moves its references. A reference that the remote rejects,
-    /// by a hook or by its settings, counts as done: its words are in the log only, and
-    /// getRemoteHeads() shows where the reference stands. One that can't be fast-forwarded, and
-    /// whose refspec does not begin with '+', is a failure, and then nothing is pushed. A
-    /// repository on this machine takes a push only when it is bare, and runs no hooks.
+    /// Uploads objects to the remote and moves its references.
+    ///
+    /// Does not fail if the remote rejects a reference by a hook or its settings: the remote's
+    /// message is in the log only, and getRemoteHeads() returns the actual reference. Fails, and
+    /// pushes nothing, if a reference cannot be fast-forwarded and its refspec does not begin with
+    /// '+'. A repository on this machine accepts a push only if it is bare, and runs no hooks.
     /// git_remote_push.
-    /// @param refspecs taken as they stand, with full names, e.g.
-    /// "refs/heads/main:refs/heads/main"; ":NAME" deletes. An empty list means those that are
-    /// configured, and pushes nothing where none are
-    /// @throws vclink::util::exception::CancelledOperationException when the application asked for
-    /// it and the remote then talks; at no other moment can a push be stopped
+    /// @param refspecs used unchanged, with full names, e.g. "refs/heads/main:refs/heads/main";
+    /// ":NAME" deletes. An empty list means the configured ones, and pushes nothing if there are
+    /// none
+    /// @throws vclink::util::exception::CancelledOperationException if the application requested it
+    /// and the remote then sends a message; a push cannot be cancelled at any other point
     virtual void push(const std::vector<ustring> &refspecs) = 0;
 
-    /// What the remote advertises, in its order; nothing for an empty remote.
+    /// Returns the references that the remote advertises, in its order; none for an empty remote.
     /// git_remote_connect, git_remote_ls.
     virtual std::vector<GitRemoteHead> getRemoteHeads() const = 0;
 };

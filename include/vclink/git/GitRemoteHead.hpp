@@ -10,25 +10,25 @@
 namespace vclink::git
 {
 
-/// A reference as a remote advertises it. A plain value, with no tie to the remote.
+/// A reference as a remote advertises it. A plain value, independent of the remote.
 class VCLINK_GIT_EXPORT GitRemoteHead
 {
   public:
-    /// The 20 bytes of an object's name.
+    /// The 20 bytes of an object's id.
     using Id = std::array<unsigned char, 20>;
 
-    /// libgit2's flag: other than 0 when it found the object in the repository here. A listing
-    /// looks for none.
+    /// libgit2's flag: not 0 if libgit2 found the object in the local repository. A listing does
+    /// not look for it.
     std::int32_t local = 0;
-    /// What the reference points at.
+    /// The object that the reference points to.
     Id oid = {};
-    /// What it points at here, if libgit2 looked; otherwise zeros.
+    /// The object that it points to in the local repository, if libgit2 looked. Otherwise zeros.
     Id loid = {};
-    /// The reference's full name, UTF-8; "HEAD" for the remote's HEAD. The name of a tag followed
-    /// by "^{}" stands for the object that the tag names.
+    /// The reference's full name, UTF-8. "HEAD" for the remote's HEAD. The name of a tag with "^{}"
+    /// appended means the object that the tag names.
     std::string name;
-    /// The name of the reference that this one stands for, UTF-8; empty when it stands for none, or
-    /// the remote does not tell.
+    /// The target of a symbolic reference, UTF-8. Empty if the reference is not symbolic, or if the
+    /// remote does not report the target.
     std::string symrefTarget;
 };
 

@@ -8,23 +8,23 @@
 namespace vclink::git
 {
 
-/// A call of libgit2 failed. The message is "LibGit2Error", with libgit2's code, class and text as
-/// arguments.
+/// Reports a failed call of libgit2. The message is "LibGit2Error", with libgit2's code, class and
+/// text as arguments.
 class VCLINK_GIT_EXPORT LibGit2Exception : public GitException
 {
   public:
     /// Copies the failure.
     explicit LibGit2Exception(const GitError &error);
-    /// A deep copy, the recorded stack included.
+    /// Makes a deep copy, including the recorded stack.
     LibGit2Exception(const LibGit2Exception &other);
     ~LibGit2Exception() noexcept override;
 
-    /// A copy on the heap, which the caller owns.
+    /// Returns a copy on the heap. The caller owns it.
     [[nodiscard]] const LibGit2Exception *clone() const override;
     /// Throws a copy of this class.
     void rethrow() const override;
 
-    /// The failure that the exception was made from, which lives as long as the exception.
+    /// Returns the failure, which lives as long as the exception.
     const GitError &getError() const noexcept;
 
   private:

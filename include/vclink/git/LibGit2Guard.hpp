@@ -10,28 +10,29 @@ namespace vclink::git
 
 class GitMergeDriverLookup;
 
-/// Keeps libgit2 alive: git_libgit2_init at construction, git_libgit2_shutdown at destruction.
-/// Guards nest by libgit2's own count; libgit2 lives from the first guard's construction to the
-/// last one's destruction. A failure of either call goes unnoticed here, and shows in the next
-/// libgit2 call.
+/// Keeps libgit2 alive. Calls git_libgit2_init at construction and git_libgit2_shutdown at
+/// destruction.
+///
+/// Guards nest: libgit2 counts the calls, and lives from the construction of the first guard to the
+/// destruction of the last one. A guard ignores a failure of these calls; the next libgit2 call
+/// fails.
 ///
 /// Each guard registers the library's merge driver, which runs the commands that Git's
-/// configuration names for `merge` attributes. libgit2 counts no registrations: the first guard
-/// that ends takes the driver away for the whole process, until the next one begins. No guard, and
-/// nothing that holds one, GitAdapterFactory::isAdapterFor included, may begin or end while another
-/// thread merges.
+/// configuration names for `merge` attributes. libgit2 does not count registrations: the first
+/// guard that ends removes the driver for the whole process, until the next guard begins. While
+/// another thread merges, no guard may begin or end, and neither may an object that holds one, nor
+/// a call of GitAdapterFactory::isAdapterFor.
 ///
-/// Starting libgit2 costs 10 to 15 milliseconds, most of it for the system's certificates. A host
-/// that probes many folders with GitAdapterFactory::isAdapterFor holds a guard of its own
-/// meanwhile.
+/// Starting libgit2 costs 10 to 15 milliseconds, most of it for the system's certificates. Hold a
+/// guard while you probe many folders with GitAdapterFactory::isAdapterFor.
 ///
-/// A guard may have static storage, and so may what holds one: the log outlives it. An object that
-/// is put into a static variable later, such as a std::unique_ptr that main fills, must be gone
+/// A guard, or an object that holds one, can have static storage: the log outlives it. If it is put
+/// into a static variable later, such as a std::unique_ptr that main fills, it must be destroyed
 /// before main returns: the log may end before it.
 ///
-/// Guards may be made and destroyed on any thread. Making one writes no record, and may throw
-/// std::bad_alloc; libgit2 is then as it was before. If a log sink throws while a guard is
-/// destroyed, the process terminates: hosts set boost::log::core::set_exception_handler.
+/// Guards can be created and destroyed on any thread. The constructor writes no record and can
+/// throw std::bad_alloc; then libgit2 is as before. If a log sink throws while a guard is
+/// destroyed, the process terminates: set boost::log::core::set_exception_handler.
 class VCLINK_GIT_EXPORT LibGit2Guard
 {
   public:

@@ -8,20 +8,20 @@
 namespace vclink::git
 {
 
-/// The version of the libgit2 that is linked at run time. git_libgit2_version. Needs no
-/// LibGit2Guard. A plain value; raises nothing but std::bad_alloc.
+/// The version of the libgit2 that is linked at run time. Needs no LibGit2Guard. A plain value;
+/// throws only std::bad_alloc. git_libgit2_version.
 class VCLINK_GIT_EXPORT LibGit2Version
 {
   public:
     LibGit2Version();
 
-    /// 1 of 1.5.0.
+    /// Returns the first number: 1 for 1.5.0.
     int getMajor() const noexcept;
-    /// 5 of 1.5.0.
+    /// Returns the second number: 5 for 1.5.0.
     int getMinor() const noexcept;
-    /// 0 of 1.5.0.
+    /// Returns the third number: 0 for 1.5.0.
     int getRevision() const noexcept;
-    /// The three numbers in decimal, a dot between each two.
+    /// Returns the three numbers in decimal, separated by dots.
     std::string toString() const;
 
   private:

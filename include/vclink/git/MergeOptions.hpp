@@ -6,7 +6,7 @@
 namespace vclink::git
 {
 
-/// What a merge may be told: nothing so far. A plain value.
+/// Options for a merge: none so far. A plain value.
 class VCLINK_GIT_EXPORT MergeOptions
 {
   public:

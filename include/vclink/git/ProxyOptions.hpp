@@ -6,7 +6,7 @@
 namespace vclink::git
 {
 
-/// What a connection may be told about proxies: nothing so far; none is used. A plain value.
+/// Options for proxies: none so far, and no proxy is used. A plain value.
 class VCLINK_GIT_EXPORT ProxyOptions
 {
   public:

@@ -9,15 +9,15 @@
 namespace vclink::git
 {
 
-/// What a push is told. A plain value.
+/// Options for a push. A plain value.
 class VCLINK_GIT_EXPORT PushOptions
 {
   public:
     PushOptions();
 
-    /// How many threads pack objects; 1 at the start.
+    /// The number of threads that pack objects. 1 by default.
     std::uint32_t packbuilderParallelism;
-    /// For the connection.
+    /// Options for the connection.
     ProxyOptions proxyOptions;
 };
 

@@ -6,7 +6,7 @@
 namespace vclink::git
 {
 
-/// What a walk over the states of files may be told: nothing so far. A plain value.
+/// Options for a walk over the states of files: none so far. A plain value.
 class VCLINK_GIT_EXPORT StatusOptions
 {
   public:

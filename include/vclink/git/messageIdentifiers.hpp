@@ -9,10 +9,10 @@
 #include "resource_core/BaseMsgID.hpp"
 #include "vclink/git/export.hpp"
 
-/// The messages of the catalogue "shared_vclink:git". Each class is named like its key, and takes
-/// the message's arguments. The ones without an exception class of their own say so; each of the
-/// others is raised as foundation::core::except::Exception<Identifier,
-/// vclink::exception::SourceControlException>, by which a host catches it.
+/// The messages of the catalogue "shared_vclink:git". Each class has the name of its key, and holds
+/// the message's arguments. Unless its description says otherwise, the library throws it as
+/// foundation::core::except::Exception<Identifier, vclink::exception::SourceControlException>, and
+/// a host catches it by that type.
 namespace shared_vclink::git
 {
 namespace detail
@@ -20,7 +20,7 @@ namespace detail
 
 inline constexpr const char *catalogue = "shared_vclink:git";
 
-/// What a value becomes in a message.
+/// Converts a value to an argument of a message.
 inline long toArgument(long number)
 {
     return number;
@@ -42,8 +42,8 @@ inline ustring &&toArgument(ustring &&text)
     return std::move(text);
 }
 
-/// Without the copies that a list of initialisers makes: such a message goes with every file of a
-/// checkout.
+/// Makes no copies, as a list of initialisers would: a checkout needs such a message for every
+/// file.
 template <class... Values> std::vector<resource_core::MsgArgument> makeArguments(Values &&...values)
 {
     std::vector<resource_core::MsgArgument> arguments;
@@ -54,7 +54,7 @@ template <class... Values> std::vector<resource_core::MsgArgument> makeArguments
 
 } // namespace detail
 
-/// A call of libgit2 failed; raised as vclink::git::LibGit2Exception.
+/// A call of libgit2 failed. Thrown as vclink::git::LibGit2Exception.
 class VCLINK_GIT_EXPORT LibGit2Error : public resource_core::BaseMsgID
 {
   public:
@@ -71,11 +71,11 @@ class VCLINK_GIT_EXPORT LibGit2Error : public resource_core::BaseMsgID
     ~LibGit2Error() override;
 };
 
-/// A merge failed; raised as vclink::git::GitException, whose added text tells the cause.
+/// A merge failed. Thrown as vclink::git::GitException, with the cause as added text.
 class VCLINK_GIT_EXPORT MergeFailed : public resource_core::BaseMsgID
 {
   public:
-    /// @param branchName what was to be merged, UTF-8
+    /// @param branchName the branch or revision to merge, UTF-8
     template <class Text>
     explicit MergeFailed(const Text &branchName)
         : BaseMsgID(detail::makeArguments(branchName), detail::catalogue, "MergeFailed")
@@ -94,7 +94,7 @@ class VCLINK_GIT_EXPORT HasConflicts : public resource_core::BaseMsgID
     ~HasConflicts() override;
 };
 
-/// A merge was asked for while another operation is in progress.
+/// A merge was requested while another operation is in progress.
 class VCLINK_GIT_EXPORT UnableToMergeBadRepositoryState : public resource_core::BaseMsgID
 {
   public:
@@ -103,7 +103,7 @@ class VCLINK_GIT_EXPORT UnableToMergeBadRepositoryState : public resource_core::
     ~UnableToMergeBadRepositoryState() override;
 };
 
-/// The configuration allows fast-forwards only, and a true merge is needed.
+/// The configuration allows only fast-forwards, and the branches need a merge commit.
 class VCLINK_GIT_EXPORT MergePreferenceFastForward : public resource_core::BaseMsgID
 {
   public:
@@ -112,7 +112,7 @@ class VCLINK_GIT_EXPORT MergePreferenceFastForward : public resource_core::BaseM
     ~MergePreferenceFastForward() override;
 };
 
-/// Files that were to be added are known to Git already.
+/// Git already knows some of the files to add.
 class VCLINK_GIT_EXPORT AlreadyAdded : public resource_core::BaseMsgID
 {
   public:
@@ -126,7 +126,7 @@ class VCLINK_GIT_EXPORT AlreadyAdded : public resource_core::BaseMsgID
     ~AlreadyAdded() override;
 };
 
-/// Nothing of what was named can be removed.
+/// None of the files can be removed.
 class VCLINK_GIT_EXPORT NoFilesToRemove : public resource_core::BaseMsgID
 {
   public:
@@ -135,7 +135,7 @@ class VCLINK_GIT_EXPORT NoFilesToRemove : public resource_core::BaseMsgID
     ~NoFilesToRemove() override;
 };
 
-/// Files that were to be reverted are in conflict.
+/// Some of the files to revert are in conflict.
 class VCLINK_GIT_EXPORT Conflicted : public resource_core::BaseMsgID
 {
   public:
@@ -149,7 +149,7 @@ class VCLINK_GIT_EXPORT Conflicted : public resource_core::BaseMsgID
     ~Conflicted() override;
 };
 
-/// No name for a commit's author can be found.
+/// There is no name for the author of a commit.
 class VCLINK_GIT_EXPORT NoUserName : public resource_core::BaseMsgID
 {
   public:
@@ -158,8 +158,7 @@ class VCLINK_GIT_EXPORT NoUserName : public resource_core::BaseMsgID
     ~NoUserName() override;
 };
 
-/// libgit2 gave an attribute value of a kind that is not known; raised as
-/// vclink::git::GitException.
+/// libgit2 returned an attribute value of an unknown kind. Thrown as vclink::git::GitException.
 class VCLINK_GIT_EXPORT InvalidGitAttributeValue : public resource_core::BaseMsgID
 {
   public:
@@ -173,7 +172,7 @@ class VCLINK_GIT_EXPORT InvalidGitAttributeValue : public resource_core::BaseMsg
     ~InvalidGitAttributeValue() override;
 };
 
-/// The step that a checkout has reached. Not raised: a progress text.
+/// The file that a checkout has reached. A progress text, never thrown.
 class VCLINK_GIT_EXPORT ProgressCallbackCheckoutMessage : public resource_core::BaseMsgID
 {
   public:
@@ -184,7 +183,7 @@ class VCLINK_GIT_EXPORT ProgressCallbackCheckoutMessage : public resource_core::
                     "ProgressCallbackCheckoutMessage")
     {
     }
-    /// @param path the file, relative to the root; it is moved from
+    /// @param path the file, relative to the root; moved from
     explicit ProgressCallbackCheckoutMessage(ustring &&path)
         : BaseMsgID(detail::makeArguments(std::move(path)), detail::catalogue,
                     "ProgressCallbackCheckoutMessage")
