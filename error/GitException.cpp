@@ -47,7 +47,7 @@ const char *GitException::what() const noexcept
     }
     catch (...)
     {
-        // The text matters more than its trace, and a failing sink has nobody to be told to here.
+        // The text matters more than its trace, and nobody can handle the failure of a sink here.
     }
     return IException::what();
 }

@@ -26,7 +26,8 @@ NoUserName::NoUserName() : BaseMsgID({}, detail::catalogue, "NoUserName")
 {
 }
 
-// Defined here, so that each class's type information has one home that the host can link to.
+// Defined here, so that the type information of each class is in the library and the host can link
+// to it.
 LibGit2Error::~LibGit2Error() = default;
 MergeFailed::~MergeFailed() = default;
 HasConflicts::~HasConflicts() = default;

@@ -15,12 +15,12 @@ template <class Tag>
 using TagException =
     foundation::core::except::Exception<Tag, vclink::exception::SourceControlException>;
 
-/// Throws the identifier's own exception class. While another exception is being handled, that one
-/// is nested in it.
+/// Throws the identifier's own exception class. If another exception is being handled, it is nested
+/// in the new one.
 template <class Tag> [[noreturn]] void raise(const Tag &message)
 {
     const vclink::exception::SourceControlException base;
-    // Not const: a nested exception's class is made of the very type that is given.
+    // Not const: the class of a nested exception is derived from exactly this type.
     TagException<Tag> exception(message, base);
     if (std::current_exception() != nullptr)
     {

@@ -9,8 +9,8 @@
 #include "error/errorUtil/callbackException.hpp"
 #include "error/logging/ScopeTrace.hpp"
 
-/// The bridge from libgit2's plain callbacks to member functions, which may throw: no exception
-/// ever crosses libgit2's frames.
+/// The bridge from libgit2's plain callbacks to member functions, which can throw. No exception
+/// crosses libgit2's frames.
 namespace vclink::git
 {
 namespace detail
@@ -25,7 +25,8 @@ struct MemberFunction<Result (Object::*)(Arguments...)>
     using ResultType = Result;
 };
 
-/// Calls a member function with all arguments but the last, on the object that the last points at.
+/// Calls a member function of the object that the last argument points to, with all other
+/// arguments.
 template <auto MemberFunctionPointer, class... Args, std::size_t... Leading>
 auto callMember(const std::tuple<Args...> &arguments, std::index_sequence<Leading...>)
 {
@@ -34,12 +35,13 @@ auto callMember(const std::tuple<Args...> &arguments, std::index_sequence<Leadin
     return (object->*MemberFunctionPointer)(std::get<Leading>(arguments)...);
 }
 
-/// Makes the plain function that stands for a member function in a record of libgit2: a lambda
-/// without captures. Its arguments are those of the callback's type, the last of them the payload,
-/// the address of the object. An exception of a member function with a result is parked in the
-/// thread's slot, and libgit2 gets the code that makes it stop; one of a member function without a
-/// result is reported to the log and gone, since libgit2 takes no code from it. An exception out of
-/// the tracing or the reporting ends the process.
+/// Returns a plain function for a record of libgit2 that calls a member function: a lambda without
+/// captures. Its arguments are those of the callback's type; the last is the payload, the address
+/// of the object.
+/// If a member function with a result throws, the exception is stored in the thread's slot, and
+/// libgit2 receives the code that makes it stop. If a member function without a result throws, the
+/// exception is logged and ignored, because libgit2 accepts no code from it. An exception from the
+/// tracing or the logging ends the process.
 /// @param signature carries the callback's argument types; its values are not read
 template <auto MemberFunctionPointer, class... Args>
 constexpr auto makeCallbackImpl([[maybe_unused]] std::tuple<Args...> signature)
@@ -76,7 +78,7 @@ template <class Result, class... Args> struct CallbackSignature<Result (*)(Args.
 
 } // namespace detail
 
-/// The function of libgit2's type Callback that stands for a member function. See
+/// Returns a function of libgit2's type Callback that calls a member function. See
 /// detail::makeCallbackImpl.
 template <auto MemberFunctionPointer, class Callback> constexpr Callback makeCallback()
 {

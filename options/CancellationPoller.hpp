@@ -7,17 +7,17 @@
 namespace vclink::git
 {
 
-/// Sees the host's requests for cancellation. Each poller has a memory of its own: a request that
-/// one has taken is still there for another.
+/// Reads the host's cancellation requests. Each poller remembers requests separately: a request
+/// that one has read is still there for another.
 class CancellationPoller
 {
   public:
-    /// Connects to the interactor's source, from now until the end of the object.
+    /// Connects to the interactor's source until the end of the object.
     /// @param interactor outlives the poller
     explicit CancellationPoller(ApplicationInteractor &interactor);
 
-    /// @throws vclink::util::exception::CancelledOperationException when cancellation was asked for
-    /// since the last call; the request is forgotten then
+    /// @throws vclink::util::exception::CancelledOperationException if cancellation was requested
+    /// since the last call; then the request is forgotten
     void throwIfCancelled();
 
   private:

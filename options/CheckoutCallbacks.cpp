@@ -42,7 +42,7 @@ void CheckoutCallbacks::checkoutProgress(const char *path, std::size_t completed
     }
     if (completedSteps == 0)
     {
-        // Once more below for a first step with a path, which is meant.
+        // Intentionally again below, for a first step with a path.
         reporter->setProgress(0.0);
     }
     if (!hasPath || totalSteps == 0)

@@ -10,7 +10,7 @@
 namespace vclink::git
 {
 
-/// A set without callbacks, which keeps its place in GitCallbacks.
+/// A set without callbacks, for its place in GitCallbacks.
 class ReservedCallbacks
 {
   public:
@@ -23,13 +23,13 @@ class ReservedCallbacks
     [[maybe_unused]] ApplicationInteractor &interactor_;
 };
 
-/// A set without callbacks: no proxy is ever asked about.
+/// A set without callbacks: libgit2 never asks about a proxy.
 class ProxyCallbacks
 {
 };
 
-/// The callback sets of one adapter or generator. libgit2's records point at the sets, so the
-/// object outlives every call that such a record is given to.
+/// The callback sets of one adapter or generator. libgit2's records point to the sets, so the
+/// object outlives every call with such a record.
 class GitCallbacks
 {
   public:
@@ -51,8 +51,8 @@ class GitCallbacks
     std::shared_ptr<ApplicationInteractor> interactor_;
 };
 
-/// The sets that adapters and generators run with. Their pollers are connected to the host's source
-/// of cancellation from now until the end of the object.
+/// Returns the sets that adapters and generators use. Their pollers are connected to the host's
+/// source of cancellation until the end of the object.
 /// @param interactor not null
 [[nodiscard]] std::unique_ptr<GitCallbacks>
 makeDefaultGitCallbacks(std::shared_ptr<ApplicationInteractor> interactor);

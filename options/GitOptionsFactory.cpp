@@ -8,7 +8,7 @@ namespace vclink::git
 namespace
 {
 
-/// Gives every value as its constructor makes it.
+/// Returns every value as its constructor sets it.
 class UninitializedGitOptionsFactory : public GitOptionsFactory
 {
   public:
@@ -44,7 +44,7 @@ class UninitializedGitOptionsFactory : public GitOptionsFactory
     }
 };
 
-/// Composes nested values; shares the other four slots.
+/// Sets nested values; inherits the other four operations.
 class DefaultGitOptionsFactory : public UninitializedGitOptionsFactory
 {
   public:

@@ -35,8 +35,8 @@ int RemoteCallbacks::credentials(git_credential **out, const char *url, const ch
 {
     writeRecord(SeverityParameter, " url=", url, " username_from_url=", usernameFromUrl,
                 " allowed_types=", allowedTypes);
-    // libgit2 sets no text of its own where this fails: one that it left on its way here, such as
-    // of a setting that is not set, would be shown as the reason.
+    // libgit2 sets no text if this fails. Without this call, the text of an earlier failure, such
+    // as a setting that is not set, would appear as the reason.
     git_error_clear();
     if ((allowedTypes & GIT_CREDENTIAL_SSH_KEY) != 0)
     {
@@ -48,14 +48,14 @@ int RemoteCallbacks::credentials(git_credential **out, const char *url, const ch
 int RemoteCallbacks::certificateCheck(git_cert * /*cert*/, int valid, const char *host)
 {
     writeRecord(SeverityParameter, " valid=", valid, " host=", host);
-    // 0 tells libgit2 to go ahead, which is meant: no certificate stops a connection.
+    // Intentionally 0, which makes libgit2 continue: no certificate stops a connection.
     return valid;
 }
 
 int RemoteCallbacks::transferProgress(const git_indexer_progress *stats)
 {
     poller_.throwIfCancelled();
-    // Back to back, which is meant.
+    // Intentionally without a separator.
     writeRecord(SeverityProgress, "Transfer Progress (Objects / Bytes): ", stats->total_objects,
                 stats->received_bytes);
     return 0;
@@ -86,7 +86,7 @@ int RemoteCallbacks::pushUpdateReference(const char *refname, const char *status
     const std::string refnameStr = refname != nullptr ? refname : "";
     const std::string statusStr = status != nullptr ? status : "";
     writeRecord(SeverityParameter, " refnameStr=", refnameStr, " statusStr=", statusStr);
-    // Also after a rejection, which is meant.
+    // Intentionally also after a rejection.
     return 0;
 }
 

@@ -14,16 +14,16 @@
 namespace vclink::git
 {
 
-/// What libgit2 talks to while it talks to a remote: cancellation, the ssh agent, and the log. The
-/// application is asked nothing and sees no progress. Its members are reached through the callback
-/// bridge; strings belong to libgit2 and are as it has them.
+/// The callbacks of a connection to a remote, for cancellation, the ssh agent, and the log. They
+/// never prompt and report no progress. libgit2 calls the members through the callback bridge;
+/// strings belong to libgit2 and are logged unchanged.
 class RemoteCallbacks
 {
   public:
     /// @param interactor outlives the set
     explicit RemoteCallbacks(ApplicationInteractor &interactor);
 
-    /// git_transport_message_cb, for text of the server's. A poll point, the only one of a push.
+    /// git_transport_message_cb, for messages of the server. A poll point, the only one of a push.
     /// @param text `length` bytes, not terminated
     /// @return 0
     /// @throws vclink::util::exception::CancelledOperationException
@@ -33,16 +33,16 @@ class RemoteCallbacks
     /// @return 0
     int completion(git_remote_completion_t type);
 
-    /// git_credential_acquire_cb. Offers the keys of the ssh agent where ssh keys are taken, each
-    /// time it is asked, and nothing anywhere else. The end of an exchange is libgit2's to find.
+    /// git_credential_acquire_cb. Offers the keys of the ssh agent each time libgit2 asks, if ssh
+    /// keys are accepted, and nothing otherwise. libgit2 decides when to stop asking.
     /// @param out owned by libgit2
-    /// @return 0, or libgit2's code: git_credential_ssh_key_from_agent, -1 where no ssh key is
-    /// taken
+    /// @return 0, or libgit2's code: that of git_credential_ssh_key_from_agent, or -1 if no ssh key
+    /// is accepted
     int credentials(git_credential **out, const char *url, const char *usernameFromUrl,
                     unsigned int allowedTypes);
 
     /// git_transport_certificate_check_cb. Accepts every certificate and every host key.
-    /// @return `valid`: for libgit2 0 goes ahead, and 1 keeps its own finding, which was good
+    /// @return `valid`: with 0 libgit2 continues, with 1 it uses its own result, which was good
     int certificateCheck(git_cert *cert, int valid, const char *host);
 
     /// git_indexer_progress_cb. A poll point.
@@ -62,8 +62,8 @@ class RemoteCallbacks
     /// @return 0
     int pushTransferProgress(unsigned int current, unsigned int total, std::size_t bytes);
 
-    /// git_push_update_reference_cb, for the log only: a reference that the server rejects counts
-    /// as done.
+    /// git_push_update_reference_cb, for the log only: a reference that the server rejects is not a
+    /// failure.
     /// @param status the server's reason for a rejection, otherwise null
     /// @return 0
     int pushUpdateReference(const char *refname, const char *status);

@@ -9,7 +9,7 @@ namespace vclink::git
 namespace
 {
 
-/// Puts the function that stands for a member function into a field of a record.
+/// Sets a field of a record to the function that calls a member function.
 template <auto MemberFunctionPointer, class Callback> void setCallback(Callback &field)
 {
     field = makeCallback<MemberFunctionPointer, Callback>();

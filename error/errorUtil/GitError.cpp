@@ -12,7 +12,7 @@ namespace vclink::git
 namespace
 {
 
-/// Whether libgit2 has told nothing: there is no record, or since 1.8 one that says so.
+/// Whether libgit2 has no error record, or (since 1.8) one that says so.
 bool isSilent(const git_error *record) noexcept
 {
     return record == nullptr ||

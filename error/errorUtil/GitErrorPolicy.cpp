@@ -39,7 +39,7 @@ void GitErrorPolicy::throwIfError(const GitError &error)
         writeRecord(SeverityDiagnostic, "Re-throwing error from callback");
         rethrowCallbackException();
     }
-    // Before the test for success, which is meant: a listing of remote heads leaves this record.
+    // Intentionally before the test for success: a listing of remote heads leaves this record.
     writeRecord(
         SeverityDiagnostic, "Throwing error ",
         [&error] { return fl::i18n::to_string(error.getMessage()); }, " (", error.getCode(), ")");

@@ -11,13 +11,13 @@
 namespace vclink::git
 {
 
-/// What a libgit2 call gave: a value, or the failure. Asking for the value of a failure throws it;
+/// The result of a libgit2 call: a value, or the failure. Reading the value of a failure throws it;
 /// see GitErrorPolicy.
 template <class T> using GitResult = boost::outcome_v2::basic_result<T, GitError, GitErrorPolicy>;
 
-/// The result of a libgit2 call that gives nothing but its code. To be called with the call itself
-/// as the argument, so that nothing comes between the two. call() is for all functions that can
-/// leave a text.
+/// Returns the result of a libgit2 call that returns only a code. Pass the call itself as the
+/// argument, so that nothing runs between the two. Use call() for all functions that can set a
+/// text.
 /// @throws std::bad_alloc
 inline GitResult<void> makeResult(int code)
 {
@@ -28,9 +28,9 @@ inline GitResult<void> makeResult(int code)
     return boost::outcome_v2::success();
 }
 
-/// Calls a libgit2 function that gives nothing but its code. libgit2 fails without a text in
-/// places, and leaves a text where it goes on from a failure of its own. Its record is emptied
-/// before the call, so that the error never has the text of an earlier one.
+/// Calls a libgit2 function that returns only a code. Clears libgit2's error record before the
+/// call, so that the error never has the text of an earlier one: libgit2 sometimes fails without a
+/// text, and keeps the text of a failure that it ignores.
 /// @throws std::bad_alloc
 template <class Function, class... Arguments>
 GitResult<void> call(Function function, Arguments... arguments)
@@ -39,23 +39,23 @@ GitResult<void> call(Function function, Arguments... arguments)
     return makeResult(function(arguments...));
 }
 
-/// For a result that has no value: throws its failure, if it is one.
+/// Throws the failure of a result without a value, if it is one.
 inline void check(const GitResult<void> &result)
 {
     result.value();
 }
 
-/// call() of a function that must succeed.
-/// @throws what GitErrorPolicy throws for a failure, std::bad_alloc
+/// call() for a function that must succeed.
+/// @throws what GitErrorPolicy throws for a failure, and std::bad_alloc
 template <class Function, class First, class... Arguments>
 void check(Function function, First first, Arguments... arguments)
 {
     check(call(function, first, arguments...));
 }
 
-/// As call(), for a function whose first argument is the address of a handle; owns the handle from
-/// then on. On a failure the error is read before a handle that libgit2 left is released,
-/// since the release may replace libgit2's error record.
+/// As call(), for a function whose first argument is the address of a handle. Owns the handle
+/// immediately. On a failure, reads the error before it releases a handle that libgit2 left,
+/// because the release may replace libgit2's error record.
 /// @throws std::bad_alloc
 template <class Handle, class Function, class... Arguments>
 GitResult<OwnedHandle<Handle>> acquire(Function function, Arguments... arguments)

@@ -8,7 +8,7 @@
 namespace vclink::git
 {
 
-/// Releases libgit2 handles. A null handle is not passed on to libgit2.
+/// Releases libgit2 handles. Does not pass a null handle to libgit2.
 class GitDeleters
 {
   public:

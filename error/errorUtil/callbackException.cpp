@@ -31,7 +31,7 @@ std::exception_ptr *findSlot()
 
 std::exception_ptr &pendingCallbackException()
 {
-    // The look-up of a thread-specific pointer is slow: once a thread.
+    // The look-up of a thread-specific pointer is slow, so do it once for each thread.
     thread_local bool found = false;
     thread_local std::exception_ptr *slot = nullptr;
     if (!found)

@@ -25,7 +25,7 @@ std::string currentDiagnosticText()
     }
     catch (...)
     {
-        // Later releases of Boost name the type here. The caller's handler still holds it.
+        // Later releases of Boost name the type here. The caller's handler still has the exception.
         return "No diagnostic information available.";
     }
 }

@@ -6,9 +6,9 @@
 namespace vclink::git
 {
 
-/// What is known of the exception in flight, for the log: seen as boost::exception and as
-/// std::exception, verbose. The same text with every Boost for an exception that is neither. To be
-/// called inside a handler.
+/// Describes the exception in flight for the log, verbosely, as a boost::exception and as a
+/// std::exception. For an exception that is neither, the text is the same with every Boost. Call it
+/// inside a handler.
 std::string currentDiagnosticText();
 
 } // namespace vclink::git

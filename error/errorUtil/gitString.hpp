@@ -5,9 +5,9 @@
 
 #include "fl/ustring.hpp"
 
-/// Texts on their way to libgit2, which takes C strings. A text with a NUL character would be cut
-/// there without notice and name another file, branch or repository, so that it is refused. An
-/// operation refuses its texts before it opens anything. Needs a LibGit2Guard.
+/// Converts texts for libgit2, which uses C strings. A NUL character would silently cut a text, so
+/// that it names another file, branch or repository: such a text is refused. An operation converts
+/// its texts before it opens anything. Needs a LibGit2Guard.
 namespace vclink::git
 {
 

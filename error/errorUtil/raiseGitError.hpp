@@ -6,7 +6,7 @@
 namespace vclink::git
 {
 
-/// Throws what libgit2 would give for a failure that the library itself finds.
+/// Throws a failure that the library itself finds, as if libgit2 had reported it.
 /// @param code of git_error_code, @param errorClass of git_error_t
 /// @throws LibGit2Exception
 [[noreturn]] void raiseGitError(int code, int errorClass, const std::string &text);

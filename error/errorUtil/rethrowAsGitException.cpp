@@ -14,7 +14,7 @@ namespace vclink::git
 namespace
 {
 
-/// The text of the exception in flight; one without a text leaves as it is.
+/// Returns the text of the exception in flight. Throws it again if it has no text.
 ustring textOfCurrentException()
 {
     try

@@ -8,7 +8,7 @@ namespace vclink::git
 
 /// Replaces the exception in flight by a GitException with this message, whose added text is the
 /// text of the one in flight: its localized text if it is an IUserException, otherwise its what().
-/// An exception of neither family passes on unchanged. To be called inside a handler.
+/// Any other exception propagates unchanged. Call it inside a handler.
 /// @throws GitException, or the exception in flight
 [[noreturn]] void rethrowAsGitException(const resource_core::BaseMsgID &id);
 

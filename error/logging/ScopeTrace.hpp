@@ -6,9 +6,9 @@
 namespace vclink::git
 {
 
-/// Traces one function: a record at its entry and one at its exit, and between the two one more
-/// open scope in the logger's count for the thread. Whether it traces is decided at its entry.
-/// Lives on the stack.
+/// Traces one function: writes a record at its entry and one at its exit, and between them adds one
+/// to the logger's count of open scopes of the thread. Decides at the entry whether to trace. Lives
+/// on the stack.
 class ScopeTrace
 {
   public:
@@ -16,7 +16,7 @@ class ScopeTrace
     /// @param signature the function's full signature; kept as a pointer
     /// @param path the function's source; kept as a pointer
     /// @param line the function's line in it
-    /// @throws what the sinks raise; the scope is not counted then
+    /// @throws what the sinks throw; then the scope is not counted
     [[nodiscard]] ScopeTrace(Logger &target, const char *signature, const char *path, unsigned line)
         : logger_(target), signature_(signature), path_(path), line_(line)
     {
@@ -27,7 +27,7 @@ class ScopeTrace
     }
     ScopeTrace(const ScopeTrace &) = delete;
     ScopeTrace &operator=(const ScopeTrace &) = delete;
-    /// A sink that raises here ends the process, as in any destructor.
+    /// A sink that throws here ends the process, as in any destructor.
     ~ScopeTrace()
     {
         if (entered_)

@@ -16,13 +16,13 @@ using Logger = foundation::core::log::basic_diagnostic_logger<char>;
 namespace detail
 {
 
-// Out of line, so that the first use takes no room at the sites that ask for the logger.
+// Not inline, so that the callers have no code for the first use.
 [[gnu::cold]] Logger makeLogger();
 
 } // namespace detail
 
-/// The one logger of the library, named "vclink::git": made at first use, destroyed at process
-/// exit.
+/// Returns the library's only logger, "vclink::git". It is created at first use and destroyed at
+/// process exit.
 inline Logger &logger()
 {
     static Logger instance = detail::makeLogger();
@@ -32,7 +32,7 @@ inline Logger &logger()
 namespace detail
 {
 
-// Out of line, so that a site that writes to a disabled severity stays small.
+// Not inline, so that callers with a disabled severity stay small.
 template <class... Values>
 [[gnu::noinline, gnu::cold]] void writeEnabledRecord(Logger &target, Severity severity,
                                                      const Values &...values)
@@ -53,10 +53,10 @@ template <class... Values>
 
 } // namespace detail
 
-/// Writes one record, made of the values with nothing between them. Nothing happens for a disabled
-/// severity: one load and one test. A value that is a function is called only when the record is
-/// written, and its result stands in the record.
-/// @throws what the sinks that the host has set raise, and what a value that is a function raises
+/// Writes one record of the values, without separators. Does nothing for a disabled severity,
+/// except one load and one test. A value that is a function is called only if the record is
+/// written, and the record has its result.
+/// @throws what the host's sinks throw, and what a value that is a function throws
 template <class... Values> void writeRecord(Severity severity, const Values &...values)
 {
     Logger &target = logger();

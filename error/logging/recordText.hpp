@@ -13,8 +13,7 @@ inline void appendToRecord(std::string &record, std::string_view text)
     record.append(text);
 }
 
-/// A null pointer adds nothing: libgit2 hands over such pointers, and a record must not fail on
-/// them.
+/// A null pointer adds nothing: libgit2 passes such pointers, and a record must not fail on them.
 inline void appendToRecord(std::string &record, const char *text)
 {
     if (text != nullptr)
@@ -23,7 +22,7 @@ inline void appendToRecord(std::string &record, const char *text)
     }
 }
 
-/// Numbers stand in decimal; a function stands for what it returns.
+/// Numbers are decimal. A function is replaced by its result.
 template <
     class Value,
     std::enable_if_t<std::is_arithmetic_v<Value> || std::is_invocable_v<const Value &>, int> = 0>

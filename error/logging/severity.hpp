@@ -4,7 +4,7 @@
 namespace vclink::git
 {
 
-/// What a record is about. Single bits; the logger holds a mask of those that are enabled.
+/// The kind of a record, a single bit. The logger has a mask of the enabled ones.
 enum Severity : unsigned
 {
     SeverityParameter = 0x02,  ///< arguments of an operation or callback
