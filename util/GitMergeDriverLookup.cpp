@@ -43,7 +43,7 @@ void reportMissing(const FileVersions &sides)
     }
 }
 
-/// One run of a configured merge command for one file; see wildcardApplyEntry().
+/// Runs a configured merge command for one file; see wildcardApplyEntry().
 int wildcardGitDriverApplyCallback(git_merge_driver * /*self*/, const char **pathOut,
                                    std::uint32_t *modeOut, git_buf *mergedOut,
                                    const char *filterName, const git_merge_driver_source *source)
@@ -72,7 +72,7 @@ int wildcardGitDriverApplyCallback(git_merge_driver * /*self*/, const char **pat
         writeRecord(SeverityStackTrace, "Merge driver ", key, " not found");
         return GIT_PASSTHROUGH;
     }
-    // A key without a value has a null pointer, which the string refuses with std::logic_error.
+    // A key without a value has a null pointer, for which std::string throws std::logic_error.
     const std::string command = entry->value;
     writeRecord(SeverityDiagnostic, entry->name, " ", command);
     return runExternalMerge(command, sides, repository, {pathOut, modeOut, mergedOut});

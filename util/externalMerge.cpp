@@ -33,7 +33,7 @@ std::string formatMarkerSize(unsigned short size)
     return text.data();
 }
 
-/// A temporary file with one side's content, removed at its end.
+/// Owns a temporary file with one side's content.
 class SideFile
 {
   public:
@@ -60,7 +60,7 @@ class SideFile
     ScopedCleanup cleanup_;
 };
 
-/// A link could lead to any file of the user's, which the commit would then hold.
+/// A link could lead to any file of the user, which the commit would then contain.
 void refuseLink(const upath &file)
 {
     const std::string name = fl::i18n::ustring_to_utf8(file.string());
@@ -72,7 +72,7 @@ void refuseLink(const upath &file)
     }
 }
 
-/// An unreadable file counts as an empty one, which is meant.
+/// Intentionally treats an unreadable file as an empty one.
 std::vector<char> readFile(const upath &file)
 {
     refuseLink(file);
@@ -121,7 +121,7 @@ int runExternalMerge(const std::string &command, const FileVersions &sides,
     writeRecord(SeverityDiagnostic, "Auto-merge successful");
     const std::vector<char> result = readFile(ours.path());
     check(git_buf_set, merged.content, result.data(), result.size());
-    // Only now: a driver that fails leaves these as they were.
+    // Last, because a driver that fails leaves these unchanged.
     *merged.path = sides.resultPath();
     *merged.mode = sides.resultMode();
     return 0;

@@ -9,8 +9,8 @@
 namespace vclink::git
 {
 
-/// The three versions of a file that is merged, and how libgit2 would merge it. Points into
-/// libgit2's own entries.
+/// The three versions of a file to merge, and libgit2's options for it. Points to libgit2's own
+/// entries.
 struct FileVersions
 {
     explicit FileVersions(const git_merge_driver_source *source);
@@ -20,9 +20,10 @@ struct FileVersions
         return ancestor != nullptr && ours != nullptr && theirs != nullptr;
     }
 
-    /// The path that ours has given the file, otherwise theirs. For complete sides.
+    /// Returns the path of the result: the changed one of ours, otherwise that of theirs. All sides
+    /// must exist.
     const char *resultPath() const noexcept;
-    /// The mode, likewise.
+    /// Returns the mode of the result in the same way.
     std::uint32_t resultMode() const noexcept;
 
     const git_index_entry *ancestor;
@@ -31,7 +32,7 @@ struct FileVersions
     const git_merge_file_options *options;
 };
 
-/// Where a driver leaves the merged file. libgit2's own.
+/// The result of a driver. Points to libgit2's own variables.
 struct MergedFile
 {
     const char **path;
@@ -39,15 +40,15 @@ struct MergedFile
     git_buf *content;
 };
 
-/// Has a command merge the sides, which it finds in temporary files; these are removed on every way
-/// out.
+/// Merges the sides by a command, which receives them in temporary files. Removes the files on
+/// every way out.
 /// @param command a template with the placeholders %O, %A, %B, %L and %P
-/// @param sides complete ones
-/// @param merged set when the command succeeds: to what it has left in the file of ours, and to the
-/// path and mode of the result
-/// @return 0, or GIT_EMERGECONFLICT when the command does not succeed
-/// @throws LibGit2Exception when a blob can't be read or the content not be handed over, and what
-/// runCommand() raises
+/// @param sides all must exist
+/// @param merged set if the command succeeds: to the content of the file of ours, and to the path
+/// and mode of the result
+/// @return 0, or GIT_EMERGECONFLICT if the command does not succeed
+/// @throws LibGit2Exception if a blob cannot be read or the content cannot be passed to libgit2,
+/// and what runCommand() throws
 [[nodiscard]] int runExternalMerge(const std::string &command, const FileVersions &sides,
                                    git_repository *repository, const MergedFile &merged);
 

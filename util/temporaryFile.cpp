@@ -25,9 +25,9 @@ namespace vclink::git
 namespace
 {
 
-/// Whether there is a file to write to. A host's tmpnam may have made it already; where it gives
-/// nothing but a name, the file is made here, for nobody but its owner. A link that somebody has
-/// put there, or anything else, is left alone.
+/// Returns true if there is a file to write to. If the host's tmpnam has returned only a name,
+/// creates the file, readable only by its owner. Does not touch a link or anything else in its
+/// place.
 bool isThere(const ustring &name)
 {
     const std::string native = fl::i18n::ustring_to_utf8(name);
@@ -48,11 +48,10 @@ void writeFile(const upath &file, const void *data, std::size_t size)
     {
         return;
     }
-    // A file that has gone since then is not made again.
+    // A file that was removed since then is not created again.
     fl::filesystem::basic_ofstream<char> stream(name, std::ios_base::in | std::ios_base::out |
                                                           std::ios_base::binary);
-    // The state of the stream is not looked at, which is meant: the command then meets what is
-    // there.
+    // Intentionally ignores the state of the stream: the command then gets the existing content.
     stream.write(static_cast<const char *>(data), static_cast<std::streamsize>(size));
     stream.close();
 }
@@ -90,7 +89,7 @@ void removeTemporaryFile(const upath &file) noexcept
     }
     catch (...)
     {
-        // What the log's sinks raise is dropped as well: this runs while a scope is left.
+        // Exceptions of the log's sinks are ignored too, because this runs while a scope ends.
         const ScopedCleanup report(
             [&file]
             {

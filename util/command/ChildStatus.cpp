@@ -40,7 +40,7 @@ void ChildStatus::look(int options, std::error_code &error) noexcept
     int code = 0;
     do
     {
-        // The child stays, so that nothing is lost when the look comes too early.
+        // Does not wait for the child, so that nothing is lost if this call is too early.
         code = ::waitid(P_PID, static_cast<id_t>(child_), &info, WEXITED | WNOWAIT | options);
     } while (code != 0 && errno == EINTR);
     if (code != 0)

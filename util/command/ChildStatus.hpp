@@ -8,12 +8,12 @@
 namespace vclink::git
 {
 
-/// Whether the system keeps the status of a child that ends. It does not while the process ignores
-/// SIGCHLD.
+/// Returns true if the system keeps the status of a child that ends. It does not if the process
+/// ignores SIGCHLD.
 [[nodiscard]] bool isChildStatusKept() noexcept;
 
-/// Learns how a child ended, and leaves it for its owner to wait for. A status that somebody else
-/// in the process has taken is an error, and never looks like success.
+/// Finds out how a child ended, and leaves the child for its owner to wait for. If another part of
+/// the process has read the status, that is an error, never a success.
 class ChildStatus
 {
   public:
@@ -21,12 +21,12 @@ class ChildStatus
     {
     }
 
-    /// Whether the child runs. Does not wait.
-    /// @param error set when the status can't be known; the child does not run then
+    /// Returns true if the child runs. Does not wait.
+    /// @param error set if the status is unknown; then the child does not run
     bool isRunning(std::error_code &error) noexcept;
 
-    /// Waits for the child's end.
-    /// @param error set when the status can't be known; the result means nothing then
+    /// Waits for the end of the child.
+    /// @param error set if the status is unknown; then the result has no meaning
     /// @return the child's exit status, or the number of the signal that ended it
     int wait(std::error_code &error) noexcept;
 

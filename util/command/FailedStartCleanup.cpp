@@ -24,8 +24,8 @@ namespace vclink::git
 namespace
 {
 
-/// Reads to a file's end.
-/// @return whether it could be
+/// Reads a file to its end.
+/// @return true if it was read
 bool readAll(int descriptor, std::string &bytes)
 {
     std::array<char, 256> part{};
@@ -58,8 +58,8 @@ std::set<pid_t> parseProcesses(const std::string &text)
     return processes;
 }
 
-/// The children that the calling thread has made and that were not waited for; nothing where they
-/// can't be known, as when no descriptor is left to read their list with.
+/// Returns the children of the calling thread that nobody has waited for, or nothing if they are
+/// unknown, for example if no descriptor is left to read their list.
 std::optional<std::set<pid_t>> readChildren()
 {
     const int descriptor = ::open("/proc/thread-self/children", O_RDONLY | O_CLOEXEC);
@@ -91,8 +91,8 @@ void reap(pid_t child) noexcept
     }
 }
 
-/// Whether a child that is about to end, within a second at most, does so as one does that could
-/// not become the command. The child stays.
+/// Returns true if a child ends, within a second, in the way of one that could not become the
+/// command. Does not wait for the child.
 bool hasFailedToStart(pid_t child) noexcept
 {
     constexpr int timeLimit = 1000;
@@ -134,7 +134,7 @@ FailedStartCleanup::~FailedStartCleanup()
 
 void FailedStartCleanup::closeSink() const noexcept
 {
-    // Some releases close it themselves; the number may be another file's by then.
+    // Some releases close it themselves; then another file can have the number.
     if (referToSameFile(source_, sink_))
     {
         ::close(sink_);
@@ -151,8 +151,8 @@ void FailedStartCleanup::reapFailedChild() const
     std::vector<pid_t> added;
     std::set_difference(children->begin(), children->end(), childrenBefore_->begin(),
                         childrenBefore_->end(), std::back_inserter(added));
-    // With more than one, a thread has ended and left its children to this one: they are somebody
-    // else's, and a failed child that stays is the smaller evil.
+    // If there are several, a thread has ended and left its children to this one. They belong to
+    // others: rather leave a failed child than wait for one of these.
     if (added.size() == 1 && hasFailedToStart(added.front()))
     {
         reap(added.front());

@@ -9,11 +9,11 @@
 namespace vclink::git
 {
 
-/// Clears away at its end what Boost.Process leaves behind when a run does not come to its own end:
-/// of a command that can't be started, the writing end of its output pipe and the child that could
-/// not become the command; of a command that was killed, the child that nobody has waited for. To
-/// be made right before the start, and to end after the child's own object. Children of the process
-/// that are none of its own are never waited for.
+/// Removes at its end what Boost.Process leaves if a run fails: for a command that cannot be
+/// started, the writing end of its output pipe and the child that could not become the command; for
+/// a command that was killed, the child that nobody has waited for. Create it right before the
+/// start, and destroy it after the child's own object. It never waits for other children of the
+/// process.
 class FailedStartCleanup
 {
   public:
@@ -24,12 +24,12 @@ class FailedStartCleanup
     FailedStartCleanup &operator=(const FailedStartCleanup &) = delete;
     ~FailedStartCleanup();
 
-    /// From now on the child is the one to wait for, and the pipe is not touched.
+    /// After this call the object waits for this child, and does not touch the pipe.
     void hasStarted(pid_t child) noexcept
     {
         child_ = child;
     }
-    /// From now on nothing is left to do.
+    /// After this call the object does nothing at its end.
     void hasEnded() noexcept
     {
         ended_ = true;

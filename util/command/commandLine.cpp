@@ -15,7 +15,7 @@ namespace
 constexpr char blank = ' ';
 constexpr char quote = '"';
 
-/// Where the last word begins: behind the last blank outside double quotes.
+/// Returns the start of the last word: after the last blank outside double quotes.
 std::size_t findLastWord(const std::string &command) noexcept
 {
     std::size_t begin = 0;
@@ -53,7 +53,7 @@ const char *findCommandFault(const std::string &command) noexcept
     {
         return "the command is empty";
     }
-    // It can only be the last word, since a quote that is not closed takes all that follows.
+    // It can only be the last word, because an open quote includes everything that follows.
     if (command.back() == quote && findLastWord(command) == command.size() - 1)
     {
         return "a double quote of the command is not closed";

@@ -23,7 +23,7 @@ namespace
 struct Program
 {
     std::string path;
-    /// A number of the system's; 0 for a program that was found.
+    /// An errno, or 0 for a program that was found.
     int error;
 };
 
@@ -34,7 +34,7 @@ std::vector<std::string> split(const std::string &path)
     return folders;
 }
 
-/// The folders that execvpe searches when PATH is not set.
+/// The folders that execvpe searches if PATH is not set.
 std::string defaultPath()
 {
     std::string path(::confstr(_CS_PATH, nullptr, 0), '\0');
@@ -43,7 +43,7 @@ std::string defaultPath()
     return path;
 }
 
-/// Why the file can't be executed; 0 when it can.
+/// Returns why the file cannot be executed, an errno, or 0 if it can.
 int findObstacle(const std::string &file)
 {
     struct stat status = {};
@@ -73,7 +73,7 @@ Program searchAsExecvpe(const std::string &name, const std::vector<std::string> 
     int result = ENOENT;
     for (const std::string &folder : folders)
     {
-        // An empty element is the working folder.
+        // An empty element means the working folder.
         const std::string file = (folder.empty() ? "." : folder) + '/' + name;
         const int error = findObstacle(file);
         if (error == 0 || !isSearchContinued(error))
@@ -85,8 +85,8 @@ Program searchAsExecvpe(const std::string &name, const std::vector<std::string> 
     return {{}, result};
 }
 
-/// What Boost.Process takes for a name: whatever access(2) allows to execute, a folder too. An
-/// empty element of PATH is the root to it.
+/// Returns what Boost.Process finds for a name: anything that access(2) allows to execute, even a
+/// folder. Boost.Process treats an empty element of PATH as the root.
 std::string searchAsBoost(const std::string &name, const std::vector<std::string> &folders)
 {
     std::string file = "./" + name;
@@ -105,7 +105,7 @@ std::string searchAsBoost(const std::string &name, const std::vector<std::string
     return file;
 }
 
-/// Whether each release of Boost.Process takes this file.
+/// Returns true if every release of Boost.Process finds this file.
 bool isTakenByBoost(const std::string &file, const std::string &name,
                     std::vector<std::string> folders)
 {
@@ -113,7 +113,7 @@ bool isTakenByBoost(const std::string &file, const std::string &name,
     {
         return false;
     }
-    // Up to 1.77 the variable is split together with its name.
+    // Up to 1.77, Boost.Process splits the variable together with its name.
     folders.front().insert(0, "PATH=");
     return searchAsBoost(name, folders) == file;
 }
@@ -143,7 +143,7 @@ std::string nameProgram(const std::string &command, std::error_code &error)
     const bool isQuotable = program.path.find('"') == std::string::npos;
     error = systemError(isQuotable ? 0 : EINVAL);
     std::string named = command;
-    // Every release from 1.74 on takes the quotes off again.
+    // Every release since 1.74 removes the quotes.
     return named.replace(word.begin, word.size,
                          program.path.find(' ') == std::string::npos ? program.path
                                                                      : '"' + program.path + '"');

@@ -9,8 +9,8 @@
 #include <fcntl.h>
 #include <unistd.h>
 
-// From Boost 1.86 on version 1 of Boost.Process stands in a folder of its own, and from 1.88 on
-// boost::process means version 2 unless told otherwise.
+// Since Boost 1.86, version 1 of Boost.Process is in a separate folder, and since 1.88
+// boost::process means version 2 by default.
 #if __has_include(<boost/process/v1/child.hpp>)
 #define BOOST_PROCESS_VERSION 1
 #include <boost/process/v1/child.hpp>
@@ -52,8 +52,8 @@ std::error_code lastError()
     return std::error_code(errno, std::system_category());
 }
 
-/// Moves a descriptor off the numbers of the standard streams, which a host may have closed: the
-/// child's own streams would come in its way there.
+/// Gives a descriptor a number above those of the standard streams, which a host may have closed:
+/// the child's own streams would replace it there.
 int moveOffStandardStreams(int descriptor)
 {
     if (descriptor < 0 || descriptor > STDERR_FILENO)
@@ -67,8 +67,8 @@ int moveOffStandardStreams(int descriptor)
     return moved;
 }
 
-/// A pipe that no other command inherits: one that another thread starts meanwhile would hold this
-/// one's output open.
+/// Makes a pipe that no other command inherits: a command that another thread starts at the same
+/// time would keep this output open.
 process::pipe makePipe()
 {
     std::array<int, 2> ends{};
@@ -84,7 +84,7 @@ process::pipe makePipe()
     return pipe;
 }
 
-/// What to hand to Boost.Process for a command.
+/// Returns what to pass to Boost.Process for a command.
 std::string makeUsable(const std::string &command)
 {
     const char *const fault = findCommandFault(command);
@@ -99,7 +99,7 @@ std::string makeUsable(const std::string &command)
     }
     std::error_code error;
     std::string named = nameProgram(command, error);
-    // In the words in which Boost.Process tells of a program that can't be executed.
+    // The text that Boost.Process uses for a program that cannot be executed.
     raiseIfError(error, "execve failed");
     return named;
 }
@@ -142,14 +142,14 @@ int runCommand(const std::string &commandTemplate,
     FailedStartCleanup cleanup(output.pipe().native_source(), output.pipe().native_sink());
     process::child child(usable, process::std_out > output, process::std_err > process::null,
                          boost::this_process::environment());
-    // Where the process can't be forked, Boost.Process raises nothing and gives no child, whose
-    // number would mean every child of the process.
+    // If the process cannot be forked, Boost.Process throws nothing and returns no child. The
+    // number of no child would mean every child of the process.
     raiseIfError(child.valid() ? std::error_code() : lastError(), "fork(2) failed");
     cleanup.hasStarted(child.id());
     ChildStatus status(child.id());
     writeRecord(SeverityDiagnostic, "Output:\n", readOutput(output, status));
     const int result = waitFor(status);
-    // Another waiter in the process may have been faster; the status is known.
+    // Another part of the process may have waited first; the status is known.
     std::error_code ignored;
     child.wait(ignored);
     cleanup.hasEnded();

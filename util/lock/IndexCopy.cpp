@@ -64,7 +64,7 @@ IndexCopy::IndexCopy(std::string index, std::string path)
 IndexCopy::IndexCopy(const std::string &index) : IndexCopy(index, index + ".vclink")
 {
     removeIfThere(path_);
-    // The lock that libgit2 takes to write the copy.
+    // The lock that libgit2 uses to write the copy.
     removeIfThere(path_ + ".lock");
     const FileDescriptor source(::open(index_.c_str(), O_RDONLY | O_CLOEXEC));
     if (source)
@@ -106,7 +106,7 @@ void IndexCopy::copyFrom(const FileDescriptor &source)
 
 void IndexCopy::copyContent(const FileDescriptor &source, std::size_t size) const
 {
-    // One byte more than there should be, to see the end without another block.
+    // One byte more than expected, to detect the end without another block.
     std::string block(std::min(size + 1, blockSize), '\0');
     for (;;)
     {

@@ -10,22 +10,22 @@
 namespace vclink::git
 {
 
-/// A copy of an index file beside it, for libgit2 to work on while the caller holds the index's
-/// lock. libgit2 replaces the file when it writes the index; that shows whether it has.
+/// A copy of an index file in the same folder. libgit2 works on it while the caller holds the index
+/// lock. libgit2 replaces the file when it writes the index, so the object can tell whether it has.
 class IndexCopy
 {
   public:
-    /// Copies the file with the second of its modification time. Entries of that second count as
-    /// racy then, to libgit2 as they do to a git that compares no fractions, as it is usually
-    /// built: else libgit2 would not mark an edit of that second, and git never see it. Without an
-    /// index there is no copy either: libgit2 knows the first checkout of a repository by that.
-    /// Removes an earlier copy that a killed operation has left.
-    /// @param index its path, no symbolic link
-    /// @throws LibGit2Exception if the file can't be read or copied; there is no copy then
+    /// Copies the file. The copy has the whole second of its modification time, so that libgit2
+    /// treats entries of that second as racy, as git does, which usually ignores fractions.
+    /// Otherwise libgit2 would not mark an edit in that second, and git would never see it. Makes
+    /// no copy if there is no index: libgit2 recognises the first checkout of a repository by that.
+    /// Removes an earlier copy of a killed operation.
+    /// @param index the path of the index file, not a symbolic link
+    /// @throws LibGit2Exception if the file cannot be read or copied; then there is no copy
     [[nodiscard]] explicit IndexCopy(const std::string &index);
     IndexCopy(const IndexCopy &) = delete;
     IndexCopy &operator=(const IndexCopy &) = delete;
-    /// Removes the copy if it is still there.
+    /// Removes the copy if it still exists.
     ~IndexCopy();
 
     const std::string &path() const noexcept
@@ -33,7 +33,7 @@ class IndexCopy
         return path_;
     }
 
-    /// Puts the copy in the index's place, in one step, if libgit2 has written it.
+    /// Replaces the index by the copy, in one step, if libgit2 has written it.
     /// @return 0, or the errno of the call that failed
     [[nodiscard]] int replaceIndex() const noexcept;
 
@@ -44,7 +44,7 @@ class IndexCopy
 
     std::string index_;
     std::string path_;
-    /// Open to the end, so that no file that libgit2 writes gets the first copy's number.
+    /// Stays open, so that no file that libgit2 writes gets the inode number of the first copy.
     FileDescriptor copy_;
     struct stat copied_ = {};
 };

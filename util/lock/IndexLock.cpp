@@ -35,7 +35,7 @@ constexpr int maximumLinks = 5;
     raiseSystemError(error, "failed to read index: '" + index + "'", GIT_ERROR_INDEX);
 }
 
-/// What the link leads to; empty when the path is no link.
+/// Returns the target of a link, empty if the path is not a link.
 std::string readIndexLink(const std::string &path)
 {
     struct stat status = {};
@@ -57,7 +57,7 @@ std::string readIndexLink(const std::string &path)
     return target;
 }
 
-/// The file that is locked and replaced, which for a symbolic link is what it leads to.
+/// Returns the file to lock and replace: the target of a symbolic link.
 std::string findIndex(git_repository *repository)
 {
     std::string path = git_repository_path(repository) + std::string("index");
@@ -83,7 +83,7 @@ std::string findIndex(git_repository *repository)
 
 } // namespace
 
-/// The lock's file, which git and libgit2 respect.
+/// The lock file, which git and libgit2 respect.
 class IndexLock::LockFile
 {
   public:
@@ -111,7 +111,8 @@ class IndexLock::LockFile
     std::string path_;
 };
 
-/// What lasts as long as the lock. The copy goes first: whoever takes the lock next makes its own.
+/// Everything that lives as long as the lock. The copy is destroyed first, because the next holder
+/// of the lock makes its own.
 class IndexLock::Held
 {
   public:

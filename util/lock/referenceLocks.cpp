@@ -19,12 +19,12 @@ using std::chrono::microseconds;
 using std::chrono::milliseconds;
 
 constexpr milliseconds defaultTimeout{100};
-/// A call of the host must come to its end.
+/// A call of the host must end.
 constexpr milliseconds longestTimeout{60'000};
 constexpr microseconds firstStep{1'000};
 constexpr microseconds longestStep{32'000};
 
-/// Between three quarters and five quarters of it.
+/// Returns between three quarters and five quarters of the time.
 microseconds vary(microseconds step, std::chrono::steady_clock::time_point now)
 {
     const auto ticks = now.time_since_epoch().count();
@@ -59,7 +59,7 @@ void awaitUnlocked(git_repository *repository, const char *reference)
         {
             git_transaction *raw = nullptr;
             const auto made = call(git_transaction_new, &raw, repository);
-            // Gives the lock up again.
+            // Releases the lock again.
             const std::unique_ptr<git_transaction, void (*)(git_transaction *)> transaction(
                 raw, git_transaction_free);
             return made.has_error() ? made : call(git_transaction_lock_ref, raw, reference);

@@ -11,21 +11,21 @@
 namespace vclink::git
 {
 
-/// How long git would try to lock a reference that is locked already: `core.filesRefLockTimeout` in
-/// milliseconds, 0 for a single try, 100 by default and when the number can't be read. A negative
-/// number, which lets git try without end, gives one minute.
-/// git_repository_config_snapshot, git_config_get_int64.
+/// Returns how long git would try to lock a locked reference: `core.filesRefLockTimeout` in
+/// milliseconds, 0 for a single try, 100 by default and if the number cannot be read. A negative
+/// number, with which git tries forever, means one minute. git_repository_config_snapshot,
+/// git_config_get_int64.
 std::chrono::milliseconds readReferenceLockTimeout(git_repository *repository);
 
-/// The pauses between tries, which grow and are never quite the same, so that two processes don't
-/// keep meeting.
+/// The pauses between tries. They grow and vary, so that two processes do not collide again and
+/// again.
 class ReferenceLockWait
 {
   public:
     explicit ReferenceLockWait(std::chrono::milliseconds timeout);
 
-    /// Pauses before the next try. The last one comes when the time is over.
-    /// @return false, at once, when there is none
+    /// Pauses before the next try. The last try is at the end of the time.
+    /// @return false immediately if there is no further try
     [[nodiscard]] bool pause();
 
   private:
@@ -33,10 +33,9 @@ class ReferenceLockWait
     std::chrono::microseconds step_;
 };
 
-/// Makes a change of references, and makes it again for a while if a reference is locked: git packs
-/// and collects references in the background, and holds such locks for milliseconds. libgit2 itself
-/// does not wait.
-/// @param change gives a GitResult; nothing of a try that finds the lock may remain
+/// Changes references, and tries again for some time if a reference is locked: git packs references
+/// in the background, and holds such locks for milliseconds. libgit2 itself does not wait.
+/// @param change returns a GitResult; a try that finds the lock must leave no effect
 /// @return the result of the last try
 template <class Change> auto retryWhileLocked(git_repository *repository, const Change &change)
 {
@@ -54,10 +53,10 @@ template <class Change> auto retryWhileLocked(git_repository *repository, const 
     return result;
 }
 
-/// For what must be written before a reference moves: waits as retryWhileLocked() until nobody
-/// holds the reference's lock, so that one that stays fails the operation first.
-/// git_transaction_lock_ref.
-/// @param reference full name
+/// Waits until nobody holds the reference's lock, as long as retryWhileLocked() does. Call it
+/// before writing what must be written before a reference moves, so that a permanent lock fails the
+/// operation first. git_transaction_lock_ref.
+/// @param reference the full name
 /// @throws LibGit2Exception with the code GIT_ELOCKED
 void awaitUnlocked(git_repository *repository, const char *reference);
 

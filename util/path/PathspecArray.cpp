@@ -15,8 +15,8 @@ namespace vclink::git
 namespace
 {
 
-/// Matches nothing in any call of libgit2, where an empty entry, "." and "/" (a file whose name is
-/// one backslash) match everything in some.
+/// Matches nothing in any call of libgit2. An empty entry, "." and "/" (a file whose name is one
+/// backslash) match everything in some calls.
 constexpr const char *matchesNothing = "..";
 
 std::string filePattern(const std::string &relative)

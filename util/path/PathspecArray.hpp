@@ -12,8 +12,8 @@
 namespace vclink::git
 {
 
-/// Owner of a git_strarray and of its strings. Points into itself, so it is neither copied nor
-/// moved; libgit2 only borrows it, for one call.
+/// Owns a git_strarray and its strings. Contains pointers to itself, so it cannot be copied or
+/// moved. libgit2 only borrows it, for one call.
 class PathspecArray
 {
   public:
@@ -22,7 +22,7 @@ class PathspecArray
     PathspecArray &operator=(const PathspecArray &) = delete;
     ~PathspecArray() = default;
 
-    /// The record: a null pointer and 0 for an empty list.
+    /// The record. An empty list has a null pointer and 0.
     const git_strarray &array() const noexcept
     {
         return array_;
@@ -37,20 +37,21 @@ class PathspecArray
 /// For git_index_add_all, git_index_remove_all, git_reset_default. Valid as long as the array.
 const git_strarray *getArrayPointer(const PathspecArray &pathspec) noexcept;
 
-/// For a field of an option record. Its pointers are valid as long as the array.
+/// Returns a value for a field of an option record. Its pointers are valid as long as the array.
 git_strarray getArray(const PathspecArray &pathspec) noexcept;
 
-/// One entry a file, in the list's order: its path relative to the root, UTF-8. The characters '*',
-/// '?' and '[' in a name act as patterns; whatever else libgit2 would not read as the name it is,
-/// is escaped. An entry that would mean everything matches nothing instead.
-/// @throws boost::filesystem::filesystem_error when a path can't be resolved
+/// Creates one entry for each file, in the list's order: its path relative to the root, UTF-8. The
+/// characters '*', '?' and '[' in a name act as patterns. Everything else that libgit2 would not
+/// read literally is escaped. An entry that would mean everything matches nothing instead.
+/// @throws boost::filesystem::filesystem_error if a path cannot be resolved
 PathspecArray makeFilePathspec(const std::vector<upath> &files, const upath &root);
 
-/// Each text as it stands, UTF-8, in the list's order: refspecs, paths that are relative already.
+/// Creates an entry for each text, unchanged, UTF-8, in the list's order: for refspecs, and for
+/// paths that are already relative.
 PathspecArray makeStringPathspec(const std::vector<ustring> &texts);
 
-/// One entry that means all below `folder`: "*" for the root.
-/// @throws boost::filesystem::filesystem_error when the folder can't be resolved
+/// Creates one entry that means everything below `folder`: "*" for the root.
+/// @throws boost::filesystem::filesystem_error if the folder cannot be resolved
 PathspecArray makeFolderPathspec(const upath &folder, const upath &root);
 
 } // namespace vclink::git

@@ -32,7 +32,7 @@ bool hasWorkingFolder()
     return !error;
 }
 
-/// What boost::filesystem::weakly_canonical gives of an absolute path.
+/// Returns what boost::filesystem::weakly_canonical returns for an absolute path.
 fs::path resolveFromRoot(const fs::path &path)
 {
     fs::path existing = path;
@@ -46,8 +46,8 @@ fs::path resolveFromRoot(const fs::path &path)
     return missing.empty() ? existing : (existing / missing).lexically_normal();
 }
 
-/// Boost asks for the working folder even if the path is absolute, and fails if that folder is
-/// gone.
+/// Boost reads the working folder even if the path is absolute, and fails if that folder does not
+/// exist.
 fs::path weaklyCanonical(const fs::path &path)
 {
     try
@@ -64,8 +64,8 @@ fs::path weaklyCanonical(const fs::path &path)
     return resolveFromRoot(path);
 }
 
-/// A separator at the end is kept by Boost 1.81. Boost 1.74 leaves it out where the path exists,
-/// and puts "." behind it elsewhere: so it is here with every release.
+/// Handles a separator at the end as Boost 1.74 does, with every release: it is removed if the path
+/// exists, otherwise "." is appended. Boost 1.81 keeps it.
 fs::path canonical(const fs::path &path)
 {
     fs::path result = weaklyCanonical(path);
@@ -78,8 +78,8 @@ fs::path canonical(const fs::path &path)
     return fs::exists(path, ignored) ? fs::path(text.substr(0, text.size() - 1)) : result / ".";
 }
 
-/// A path cut into a folder that is given without "." and "..", and a name in it: the two can be
-/// resolved one after the other. No folder where the path can't be cut so.
+/// A path split into a folder without "." and "..", and a name in it, which can be resolved one
+/// after the other. Has no folder if the path cannot be split.
 struct NameInFolder
 {
     std::string_view folder;
@@ -89,7 +89,7 @@ struct NameInFolder
 NameInFolder cut(std::string_view path)
 {
     const std::size_t slash = path.rfind('/');
-    // Longer than the system takes: refused as a whole, not followed element by element.
+    // Longer than the system allows: refused completely, not resolved element by element.
     const bool isTooLong = path.size() >= PATH_MAX;
     if (isTooLong || slash == std::string_view::npos || slash == 0 ||
         !isName(path.substr(slash + 1)))
@@ -126,8 +126,8 @@ bool isAscii(std::string_view text)
     return (seen & highBits) == 0;
 }
 
-/// Puts the name into `converted`, whose room is used again where the name is ASCII, as nearly all
-/// are: this runs once for each file of a status walk.
+/// Converts the name into `converted`. Reuses its memory if the name is ASCII, as nearly all are:
+/// this runs for each file of a status walk.
 void convertName(const char *name, ustring &converted)
 {
     const std::string_view units(name);
@@ -174,7 +174,7 @@ const RootRelativePaths::FolderBelowRoot &RootRelativePaths::findFolder(const st
     {
         return known->second;
     }
-    // Step by step only from the root on: above it nothing would be found below it.
+    // Step by step only below the root: a path above the root cannot be below it.
     const bool isGivenBelow = folder.size() > given_.size() && folder.rfind(given_ + '/', 0) == 0;
     const std::string relative =
         isGivenBelow ? resolve(folder) : canonical(folder).lexically_relative(root_).string();

@@ -13,24 +13,23 @@
 namespace vclink::git
 {
 
-/// Makes paths relative to one root. The root is resolved once, at construction, and each folder
-/// that the paths lie in once. For one operation on one thread: what was resolved is kept, and is
-/// not looked at again.
+/// Makes paths relative to one root. Resolves the root once, at construction, and each folder of
+/// the paths once. Use it for one operation on one thread, because it keeps what it has resolved.
 class RootRelativePaths
 {
   public:
-    /// @throws boost::filesystem::filesystem_error when the root can't be resolved
+    /// @throws boost::filesystem::filesystem_error if the root cannot be resolved
     explicit RootRelativePaths(const upath &root);
 
-    /// What boost::filesystem::relative gives of `path` and the root, with forward slashes, in
-    /// UTF-8: symbolic links in the existing part of either are resolved. "." for the root itself,
-    /// a leading ".." for a path outside, empty where the two can't be related (an empty path, a
-    /// relative one of which nothing exists).
-    /// @throws boost::filesystem::filesystem_error when it can't be resolved
+    /// Returns what boost::filesystem::relative returns for `path` and the root, with forward
+    /// slashes, in UTF-8. Symbolic links in the existing part of both are resolved. The result is
+    /// "." for the root itself, begins with ".." for a path outside, and is empty if the path
+    /// cannot be related to the root (an empty path, or a relative one of which nothing exists).
+    /// @throws boost::filesystem::filesystem_error if the path cannot be resolved
     std::string relative(const upath &path);
 
   private:
-    /// Nothing for a folder that does not lie at or below the root.
+    /// Returns nothing for a folder that is not the root or below it.
     using FolderBelowRoot = boost::optional<std::string>;
     std::string resolve(const std::string &path);
     const FolderBelowRoot &findFolder(const std::string &folder);
@@ -40,15 +39,16 @@ class RootRelativePaths
     std::unordered_map<std::string, FolderBelowRoot> folders_;
 };
 
-/// One path relative to `root`; see RootRelativePaths::relative.
+/// Returns one path relative to `root`; see RootRelativePaths::relative.
 /// @throws boost::filesystem::filesystem_error
 ustring relativeToRoot(const upath &root, const upath &path);
 
-/// The root with a name that Git reported appended; an empty name gives the root.
+/// Returns the root with a name appended that Git reported. An empty name returns the root.
 /// @param name relative to the root, UTF-8 or any other bytes, never null
 upath joinRepositoryPath(const upath &root, const char *name);
 
-/// The same, for many names: the converted name is put into `buffer`, whose room serves the next.
+/// The same for many names. Converts each name into `buffer`, whose memory is used for the next
+/// one.
 upath joinRepositoryPath(const upath &root, const char *name, ustring &buffer);
 
 } // namespace vclink::git

@@ -14,19 +14,19 @@ bool contains(std::string_view characters, char character)
     return characters.find(character) != std::string_view::npos;
 }
 
-/// A class of one character, not the character behind a backslash: libgit2 takes the common
-/// beginning of all patterns, up to the first wildcard, for where to look, so that of "\#a" and
-/// "\!b" a lone backslash would remain, and nothing be found; and a trailing carriage return is
-/// cut even behind a backslash. Within the class '!' negates and a line's end ends the pattern,
-/// unless a backslash stands before it.
+/// Returns a class of one character, because a backslash before the character fails in two cases.
+/// libgit2 searches below the common beginning of all patterns, up to the first wildcard: for "\#a"
+/// and "\!b" that is a single backslash, and nothing is found. And libgit2 removes a trailing
+/// carriage return even after a backslash. In the class, '!' negates and a line end ends the
+/// pattern, unless a backslash is before it.
 std::string classOf(char character)
 {
     const bool special = character == '!' || character == '\\' || contains(lineEnds, character);
     return std::string(special ? "[\\" : "[") + character + ']';
 }
 
-/// The one character as the complement of all others. libgit2 also takes a pattern for a name, as
-/// it stands; the two slashes see to it that no file has this one.
+/// Returns the character as the complement of all others. libgit2 also compares a pattern literally
+/// with names: because of the two slashes, no file has such a name.
 std::string complementOf(char character)
 {
     const auto escaped = [](int code)
@@ -39,7 +39,7 @@ std::string complementOf(char character)
     return "[^//\x01-" + escaped(code - 1) + escaped(code + 1) + "-\xFF]";
 }
 
-/// Nearly all names are read as they stand.
+/// libgit2 reads nearly all names literally.
 bool isReadAsItStands(std::string_view name)
 {
     return !name.empty() && name.front() != '#' && name.front() != '!' &&
@@ -47,14 +47,14 @@ bool isReadAsItStands(std::string_view name)
            name.find_first_of(lineEnds) == std::string_view::npos;
 }
 
-/// Where the white space begins that libgit2 would cut.
+/// Returns the start of the white space that libgit2 would remove.
 std::size_t findTrailingWhiteSpace(std::string_view name)
 {
     const std::size_t last = name.find_last_not_of(whiteSpace);
     return last == std::string_view::npos ? 0 : last + 1;
 }
 
-/// @param special what gets a class wherever it stands
+/// @param special the characters that get a class in any place
 /// @param makeClass makes a pattern that means one character
 std::string escape(std::string_view name, std::string_view special,
                    std::string (*makeClass)(char character))
@@ -82,7 +82,7 @@ std::string escape(std::string_view name, std::string_view special,
 
 std::string escapePathspec(std::string_view name)
 {
-    // A '[' left as it is could take a class that follows into its own.
+    // An unchanged '[' could include a following class.
     return isReadAsItStands(name) ? std::string(name) : escape(name, "[", classOf);
 }
 

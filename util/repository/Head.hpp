@@ -11,25 +11,25 @@
 namespace vclink::git
 {
 
-/// Where HEAD was. The lock of the index does not keep it there: `git commit` gives the lock up
-/// before it runs its hooks and the editor, and moves the branch when they are done. What an
-/// operation has read of HEAD is old then, and to go on with it would undo that commit.
+/// Remembers the value of HEAD. The index lock does not protect it: `git commit` releases the lock
+/// before it runs its hooks and the editor, and moves the branch afterwards. An operation that
+/// continues with the old HEAD would undo that commit.
 class Head
 {
   public:
-    /// On an unborn branch.
+    /// HEAD on an unborn branch.
     Head() = default;
-    /// @param reference what HEAD resolves to; null on an unborn branch
+    /// @param reference the reference to which HEAD resolves; null on an unborn branch
     explicit Head(const git_reference *reference);
 
     /// git_repository_head.
     /// @throws LibGit2Exception if HEAD cannot be read
     [[nodiscard]] bool hasMoved(git_repository *repository) const;
-    /// @throws LibGit2Exception if it has moved: with the code GIT_EMODIFIED, the class
-    /// GIT_ERROR_REFERENCE and movedText
+    /// @throws LibGit2Exception with the code GIT_EMODIFIED, the class GIT_ERROR_REFERENCE and
+    /// movedText if HEAD has moved
     void refuseMoved(git_repository *repository) const;
 
-    /// For an operation that has not written anything.
+    /// The text for an operation that has not written anything.
     static const char *const movedText;
 
   private:
@@ -37,7 +37,7 @@ class Head
     git_oid id_ = {};
 };
 
-/// What HEAD resolves to, null on an unborn branch. git_repository_head.
+/// Returns the reference to which HEAD resolves, null on an unborn branch. git_repository_head.
 /// @throws LibGit2Exception
 [[nodiscard]] OwnedHandle<git_reference> lookupHead(git_repository *repository);
 

@@ -15,8 +15,8 @@ namespace vclink::git
 namespace
 {
 
-/// libgit2 takes an index file that it can't look at for one that is not there. Whoever then writes
-/// the index, or commits it, takes every file out of it.
+/// libgit2 treats an unreadable index file as a missing one. If such an index is written or
+/// committed, every file is removed from it.
 void readAgainIfEmpty(git_index *index)
 {
     const char *const path = git_index_path(index);
@@ -35,7 +35,7 @@ void readAgainIfEmpty(git_index *index)
     }
 }
 
-/// libgit2 takes a file that it can't look at for one that is not there.
+/// libgit2 treats an unreadable file as a missing one.
 bool hasMergeHead(git_repository *repository)
 {
     const std::string path = git_repository_path(repository) + std::string("MERGE_HEAD");
@@ -77,7 +77,7 @@ OwnedHandle<git_repository> openRepository(const upath &root)
 int readRepositoryState(git_repository *repository)
 {
     const int state = git_repository_state(repository);
-    // The commit that concludes a merge would forget the other side.
+    // Otherwise the commit that concludes a merge would lose the other side.
     return state == GIT_REPOSITORY_STATE_NONE && hasMergeHead(repository)
                ? git_repository_state(repository)
                : state;
@@ -86,7 +86,7 @@ int readRepositoryState(git_repository *repository)
 void cleanUpRepositoryState(git_repository *repository)
 {
     check(git_repository_state_cleanup, repository);
-    // The next commit would be one of the same merge.
+    // Otherwise the next commit would be part of the same merge.
     if (hasMergeHead(repository))
     {
         check(git_repository_state_cleanup, repository);
@@ -132,8 +132,8 @@ GitResult<OwnedHandle<git_object>> revparseObject(git_repository *repository,
 
 const git_oid *revparseId(const std::string &spec, git_repository *repository)
 {
-    // libgit2's cache refuses blobs and objects over 4 KiB, so that releasing the object may free
-    // the id that lies in it. The copy is taken before.
+    // Copies the id first: libgit2 does not cache blobs and objects over 4 KiB, so releasing the
+    // object can free the id in it.
     thread_local git_oid copy;
     const OwnedHandle<git_object> object = revparseObject(repository, spec).value();
     git_oid_cpy(&copy, git_object_id(object.get()));

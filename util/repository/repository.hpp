@@ -9,55 +9,57 @@
 #include "error/errorUtil/GitResult.hpp"
 #include "fl/filesystem/path.hpp"
 
-/// Each helper wraps one libgit2 getter and hands out a handle that the caller owns. A handle
-/// belongs to one operation and one thread. Those that raise throw what GitErrorPolicy throws.
+/// Each function wraps one libgit2 getter and returns a handle that the caller owns. A handle
+/// belongs to one operation and one thread. The functions throw what GitErrorPolicy throws, except
+/// those that return a GitResult.
 namespace vclink::git
 {
 
-/// Whether `path` itself is a repository: no search upwards, and nothing stays open.
+/// Returns true if `path` itself is a repository, without searching upwards. Keeps nothing open.
 /// git_repository_open_ext.
-/// @throws LibGit2Exception when that can't be found out, a missing folder not counting
+/// @throws LibGit2Exception if this cannot be found out; a missing folder is not a repository
 bool isRepository(const upath &path);
 
-/// Opens the repository of exactly this folder. git_repository_open_ext. Raises.
+/// Opens the repository of exactly this folder. git_repository_open_ext.
 [[nodiscard]] OwnedHandle<git_repository> openRepository(const upath &root);
 
-/// What is under way, a number of git_repository_state_t. git_repository_state, and once more where
-/// it says that nothing is and MERGE_HEAD stands. Raises when that can't be looked at.
+/// Returns the operation under way, a git_repository_state_t. git_repository_state, and again if it
+/// reports none and MERGE_HEAD exists. Throws if MERGE_HEAD cannot be examined.
 int readRepositoryState(git_repository *repository);
 
-/// git_repository_state_cleanup, and once more where MERGE_HEAD stands after it. Raises.
+/// Calls git_repository_state_cleanup, and again if MERGE_HEAD still exists.
 void cleanUpRepositoryState(git_repository *repository);
 
-/// git_repository_index, and for an empty index git_index_read, to be sure. Raises.
+/// Returns the repository's index. git_repository_index, and for an empty index git_index_read, to
+/// be sure.
 [[nodiscard]] OwnedHandle<git_index> getRepositoryIndex(git_repository *repository);
 
-/// git_index_open, and for an empty index git_index_read, to be sure: what this file holds,
-/// whatever the repository's index has come to in memory. Raises.
+/// Returns the content of the index file, whatever the repository's index has in memory.
+/// git_index_open, and for an empty index git_index_read, to be sure.
 [[nodiscard]] OwnedHandle<git_index> openIndex(const char *path);
 
-/// git_index_write. Raises; the index on disk is as it was then.
+/// Writes the index. After a failure the index on disk is unchanged. git_index_write.
 void writeIndex(git_index *index);
 
-/// The id of the tree made of the index. git_index_write_tree. Raises.
+/// Writes a tree of the index and returns its id. git_index_write_tree.
 git_oid writeIndexTree(git_index *index);
 
-/// git_tree_lookup. Raises.
+/// Returns a tree. git_tree_lookup.
 [[nodiscard]] OwnedHandle<git_tree> lookupTree(git_repository *repository, const git_oid *id);
 
-/// The object that a revision text names. git_revparse_single. Keeps a failure.
+/// Returns the object that a revision text names, or the failure. git_revparse_single.
 GitResult<OwnedHandle<git_object>> revparseObject(git_repository *repository,
                                                   const std::string &spec);
 
-/// The id of the object that a revision text names. git_revparse_single, git_object_id. Raises.
-/// @return the calling thread's copy, good until the next call on the thread
+/// Returns the id of the object that a revision text names. git_revparse_single, git_object_id.
+/// @return the calling thread's copy, valid until the next call on the thread
 const git_oid *revparseId(const std::string &spec, git_repository *repository);
 
-/// The id of HEAD's commit. git_reference_name_to_id. Raises.
+/// Returns the id of HEAD's commit. git_reference_name_to_id.
 git_oid readHeadId(git_repository *repository);
 
-/// The commit of a reference, by any name that git_reference_dwim takes. git_reference_dwim,
-/// git_reference_target, git_commit_lookup. Keeps a failure.
+/// Returns the commit of a reference, or the failure, for any name that git_reference_dwim accepts.
+/// git_reference_dwim, git_reference_target, git_commit_lookup.
 GitResult<OwnedHandle<git_commit>> lookupCommitByName(const char *name, git_repository *repository);
 
 } // namespace vclink::git

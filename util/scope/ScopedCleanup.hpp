@@ -7,8 +7,8 @@
 namespace vclink::git
 {
 
-/// Runs a function at the end of a scope, on every way out of it. Nothing for an empty function.
-/// What the function raises is dropped.
+/// Runs a function at the end of a scope, on every way out. Does nothing for an empty function.
+/// Ignores exceptions of the function.
 class ScopedCleanup
 {
   public:
