@@ -4,6 +4,7 @@
 #include <string>
 #include <string_view>
 
+#include <git2/deprecated.h> // LIBGIT2_VER_MAJOR, of which 1.8 has made another name
 #include <git2/errors.h>
 #include <git2/version.h>
 
