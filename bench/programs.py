@@ -1,6 +1,7 @@
 # SPDX-License-Identifier: MIT
 """Runs the measured programs and reads what they say."""
 
+import glob
 import os
 import statistics
 import subprocess
@@ -21,7 +22,8 @@ class Programs:
     def __init__(self, build, scratch):
         self._build = os.path.join(build, "bench")
         stage = os.path.join(os.path.abspath(build), "stage")
-        self.library = os.path.join(stage, "lib", "libvclink_git.so")
+        self.library = glob.glob(os.path.join(stage, "lib", "**", "libvclink_git.so"),
+                                 recursive=True)[0]
         self.tool = os.path.join(stage, "bin", "lnxhost", "vkAutoMerge.sh")
         self._scratch = scratch
         self._env = working_copies.environment(os.path.join(scratch, "home"))

@@ -30,9 +30,6 @@ if(VCLINK_BUILD_EXAMPLES)
     install(TARGETS vclink-shell
         RUNTIME DESTINATION "${CMAKE_INSTALL_BINDIR}"
         COMPONENT shell)
-    install(FILES examples/shell/vclink-shell.1
-        DESTINATION "${CMAKE_INSTALL_MANDIR}/man1"
-        COMPONENT shell)
     install(FILES examples/shell/completion.bash
         DESTINATION "${CMAKE_INSTALL_DATADIR}/bash-completion/completions"
         RENAME vclink-shell

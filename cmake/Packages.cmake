@@ -39,16 +39,58 @@ Copyright: @holder@
 License: Expat@terms@
 " @ONLY)
 
-# vclink_package(COMPONENT NAME SECTION SUMMARY [DEPENDS text]): a component as a package.
+# vclink_compress(FILE RESULT): as Debian has documents, without a name or a time inside.
+find_program(VCLINK_GZIP gzip REQUIRED)
+mark_as_advanced(VCLINK_GZIP)
+function(vclink_compress file result)
+    execute_process(COMMAND "${VCLINK_GZIP}" -9nc INPUT_FILE "${file}" OUTPUT_FILE "${result}"
+        COMMAND_ERROR_IS_FATAL ANY)
+    set_property(DIRECTORY APPEND PROPERTY CMAKE_CONFIGURE_DEPENDS "${file}")
+endfunction()
+
+set(changelog "${PROJECT_BINARY_DIR}/package/changelog")
+file(CONFIGURE OUTPUT "${changelog}" CONTENT
+"vclink-git (@PROJECT_VERSION@) unstable; urgency=medium
+
+  * What has changed is told in CHANGELOG.md, in libvclink-git-dev.
+
+ -- @CPACK_PACKAGE_CONTACT@  Sun, 01 Nov 2026 12:00:00 +0000
+" @ONLY)
+vclink_compress("${changelog}" "${changelog}.gz")
+
+# What a package with a shared library has the system do.
+set(triggers "${PROJECT_BINARY_DIR}/package/triggers")
+file(WRITE "${triggers}" "activate-noawait ldconfig\n")
+
+# Remarks of lintian that are meant, with the reason.
+set(reason_bogus-mail-host "The packages are made where they are used, and have no maintainer.")
+set(reason_bogus-mail-host-in-debian-changelog "${reason_bogus-mail-host}")
+set(reason_maintscript-calls-ldconfig "CPack's own scripts, beside the trigger.")
+set(reason_subdir-in-usr-bin "The application looks for its launchers there.")
+
+# vclink_package(COMPONENT NAME SECTION SUMMARY [DEPENDS text] [LINTIAN tag...] [TRIGGERS]): a component
+# as a package; TRIGGERS for one with a shared library.
 macro(vclink_package component name section summary)
-    cmake_parse_arguments(package "" "DEPENDS" "" ${ARGN})
+    cmake_parse_arguments(package "TRIGGERS" "DEPENDS" "LINTIAN" ${ARGN})
     string(TOUPPER "${component}" upper)
     set(CPACK_DEBIAN_${upper}_PACKAGE_NAME ${name})
     set(CPACK_DEBIAN_${upper}_PACKAGE_SECTION ${section})
     set(CPACK_COMPONENT_${upper}_DESCRIPTION "${summary}")
     set(CPACK_DEBIAN_${upper}_PACKAGE_DEPENDS "${package_DEPENDS}")
-    install(FILES "${copyright}"
+    if(package_TRIGGERS)
+        set(CPACK_DEBIAN_${upper}_PACKAGE_CONTROL_EXTRA "${triggers}")
+    endif()
+    set(overrides "${PROJECT_BINARY_DIR}/package/${name}.overrides")
+    file(WRITE "${overrides}" "")
+    foreach(tag IN ITEMS bogus-mail-host bogus-mail-host-in-debian-changelog ${package_LINTIAN})
+        file(APPEND "${overrides}" "# ${reason_${tag}}\n${name}: ${tag}\n")
+    endforeach()
+    install(FILES "${copyright}" "${changelog}.gz"
         DESTINATION share/doc/${name}
+        COMPONENT ${component})
+    install(FILES "${overrides}"
+        DESTINATION share/lintian/overrides
+        RENAME ${name}
         COMPONENT ${component})
 endmacro()
 
@@ -57,6 +99,11 @@ endmacro()
 set(safe_libgit2_1.5 "1.5.1+ds-1+deb12u2")
 set(safe_libgit2_1.8 "1.8.7")
 set(safe_libgit2_1.9 "1.9.7")
+# Debian 13 has them in a package with a lower number.
+cmake_host_system_information(RESULT system QUERY DISTRIB_ID DISTRIB_VERSION_ID)
+if(system STREQUAL "debian;13")
+    set(safe_libgit2_1.9 "1.9.0+ds-2+deb13u1")
+endif()
 string(REGEX MATCH "^[0-9]+\\.[0-9]+" libgit2_series "${libgit2_VERSION}")
 set(safe_libgit2 "")
 if(DEFINED safe_libgit2_${libgit2_series})
@@ -78,12 +125,19 @@ endif()
 vclink_package(runtime ${runtime} libs
     "Git back end of a desktop application
  The shared library that answers the application's source-control interfaces."
-    DEPENDS "${runtime_depends}")
+    DEPENDS "${runtime_depends}"
+    LINTIAN maintscript-calls-ldconfig
+    TRIGGERS)
 vclink_package(development libvclink-git-dev libdevel
     "Git back end of a desktop application, for developers
  Headers, and what finds the library from CMake and from pkg-config."
     DEPENDS "${runtime} (= ${PROJECT_VERSION}), libvclink-host-dev (>= ${PROJECT_VERSION}), libboost-dev (>= 1.74)")
 if(VCLINK_BUILD_EXAMPLES)
+    set(manual "${PROJECT_BINARY_DIR}/package/vclink-shell.1.gz")
+    vclink_compress("${PROJECT_SOURCE_DIR}/examples/shell/vclink-shell.1" "${manual}")
+    install(FILES "${manual}"
+        DESTINATION "${CMAKE_INSTALL_MANDIR}/man1"
+        COMPONENT shell)
     list(APPEND CPACK_COMPONENTS_ALL shell)
     vclink_package(shell vclink-shell vcs
         "Terminal host of a Git back end
@@ -94,8 +148,9 @@ if(VCLINK_HOST STREQUAL "source")
     list(APPEND CPACK_COMPONENTS_ALL host-runtime host-development)
     vclink_package(host-runtime ${host_runtime} libs
         "Stand-in for the SDK of a desktop application
- Where the application's own SDK is installed, it takes the place of this
- library.")
+ It gives way to the application's own SDK."
+        LINTIAN maintscript-calls-ldconfig subdir-in-usr-bin
+        TRIGGERS)
     vclink_package(host-development libvclink-host-dev libdevel
         "Stand-in for the SDK of a desktop application, for developers
  Headers, and what finds the stand-in from CMake and from pkg-config."

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 // The Debian packages, which the fixture of these tests has made: what they say of themselves, and
 // that a host is built against what they hold.
+#include <chrono>
 #include <filesystem>
 #include <fstream>
 #include <istream>
@@ -177,6 +178,18 @@ TEST_F(DebianPackages, TellTheLicenceAsDebiansToolsReadIt)
         EXPECT_EQ(std::string(std::istreambuf_iterator<char>(copyright), {}), expected)
             << package.first;
     }
+}
+
+/// What is meant is told in the packages, with its reason.
+TEST_F(DebianPackages, HaveNothingThatDebiansPolicyRemarks)
+{
+    std::vector<std::string> lintian{"lintian", "--allow-root", "--fail-on", "error,warning"};
+    for (const auto &package : packages())
+    {
+        lintian.push_back(package.second.string());
+    }
+    const auto result = Command(lintian).timeout(std::chrono::minutes(2)).run();
+    EXPECT_TRUE(result.succeeded()) << result.output << result.errors;
 }
 
 TEST_F(DebianPackages, LeaveWhatDebuggersReadToOthersThatMatch)
