@@ -54,7 +54,7 @@ OwnedHandle<git_reference> lookupLocalBranch(git_repository *repository, const c
     return acquire<git_reference>(git_branch_lookup, repository, name, GIT_BRANCH_LOCAL).value();
 }
 
-/// Of a function that answers with 1 or 0.
+/// Reads the result of a function that returns 1 or 0.
 bool isYes(const GitResult<void> &answer)
 {
     if (answer.has_value() || answer.error().getCode() < 0)
@@ -65,7 +65,7 @@ bool isYes(const GitResult<void> &answer)
     return true;
 }
 
-/// As git_repository_set_head does, which comes after the files have been written.
+/// Refuses what git_repository_set_head would refuse after the files have been written.
 void refuseCheckedOutElsewhere(const git_reference *branch)
 {
     if (isYes(call(git_branch_is_checked_out, branch)) && !isYes(call(git_branch_is_head, branch)))
@@ -137,7 +137,7 @@ void BasicBranchManager::switchBranch(const BranchName &name)
     check(git_checkout_tree, repository.get(), target.get(), &record);
     watch.settleSubmodules();
     lock.publish();
-    // Only now, so that a checkout that fails leaves HEAD where it was.
+    // After the checkout, so that HEAD stays if the checkout fails.
     const char *const head = git_reference_name(branch.get());
     check(retryWhileLocked(repository.get(),
                            [&] { return call(git_repository_set_head, repository.get(), head); }));
@@ -170,8 +170,8 @@ void BasicBranchManager::deleteBranch(const BranchName &name)
     {
         if (!std::exchange(isFirstTry, false))
         {
-            // A handle that has met locked packed references takes the branch for gone from then
-            // on, and reports success.
+            // After a look at locked packed references, a handle treats the branch as deleted and
+            // reports success.
             repository = adapter_.getRepository();
         }
         const OwnedHandle<git_reference> branch = lookupLocalBranch(repository.get(), shortName);
@@ -204,13 +204,13 @@ void BasicBranchManager::merge(BranchName name)
 std::string BasicBranchManager::getRepositoryState() const
 {
     const OwnedHandle<git_repository> repository = adapter_.getRepository();
-    // The plain answer, which can't fail: only a merge and a commit have to look more closely.
+    // The simple query, which cannot fail: only merges and commits must look more closely.
     return describeRepositoryState(git_repository_state(repository.get()));
 }
 
 std::string describeRepositoryState(int state)
 {
-    // By the numbers of git_repository_state_t.
+    // In the order of git_repository_state_t.
     static constexpr std::array<const char *, 12> texts{
         "Normal",        "Conflicts",           "Conflicts", "Conflicts",          "Conflicts",
         "Conflicts",     "Bisecting",           "Rebase",    "Rebase interactive", "Rebase w/merge",

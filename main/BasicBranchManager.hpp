@@ -39,7 +39,8 @@ class BasicBranchManager : public BranchManager
     GitCallbacks *callbacks_;
 };
 
-/// What getRepositoryState() says of a git_repository_state_t; nothing for any other number.
+/// Returns the text of getRepositoryState() for a git_repository_state_t, or nothing for any other
+/// number.
 std::string describeRepositoryState(int state);
 
 } // namespace vclink::git

@@ -8,7 +8,7 @@ namespace vclink::git
 namespace
 {
 
-/// An attribute in words, for its name.
+/// Writes an attribute as text, with its name.
 class Words
 {
   public:

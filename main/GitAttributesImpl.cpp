@@ -18,7 +18,7 @@ namespace
 
 using State = decltype(GitAttribute::attributeValue);
 
-/// @param value what git_attr_get gave
+/// @param value the result of git_attr_get
 State classify(const char *value)
 {
     switch (git_attr_value(value))
@@ -40,7 +40,7 @@ State classify(const char *value)
 GitAttributesImpl::GitAttributesImpl(GitAdapter &adapter) : adapter_(adapter)
 {
     const OwnedHandle<git_repository> repository = adapter_.getRepository();
-    // Dropped, which is meant: no query depends on it.
+    // Intentionally ignored: no query depends on it.
     static_cast<void>(call(git_attr_cache_flush, repository.get()));
 }
 

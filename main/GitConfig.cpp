@@ -43,7 +43,7 @@ class Buffer
     git_buf buffer_ = {};
 };
 
-/// A failure counts as no value, which is meant.
+/// Intentionally treats a failure as no value.
 std::optional<ustring> read(git_config *config, const ConfigKey &key)
 {
     Buffer value;

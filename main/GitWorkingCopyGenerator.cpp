@@ -28,7 +28,7 @@ struct GitWorkingCopyGenerator::Impl
     {
     }
 
-    // First made and last gone: libgit2 lives before and after all that could need it.
+    // Constructed first and destroyed last, so that libgit2 outlives everything that needs it.
     LibGit2Guard guard;
     std::unique_ptr<GitOptionsFactory> optionsFactory;
     std::unique_ptr<GitCallbacks> callbacks;
@@ -61,7 +61,7 @@ void GitWorkingCopyGenerator::generate(const ustring &repositorySpecifier, const
     const CloneOptions options = impl_->optionsFactory->makeCloneOptions();
     const git_clone_options record = toGitCloneOptions(options, *impl_->callbacks);
     const SigpipeBlock sigpipe;
-    // Its checkout needs no CheckoutWatch: libgit2 clones into a new or an empty folder only.
+    // Needs no CheckoutWatch: libgit2 clones only into a new or an empty folder.
     acquire<git_repository>(git_clone, url.c_str(), path.c_str(), &record).value();
 }
 

@@ -11,13 +11,13 @@ namespace vclink::git
 
 LibGit2Guard::LibGit2Guard() : drivers_(std::make_unique<GitMergeDriverLookup>())
 {
-    // The logger, and Boost.Log's core below it, are made before any guard of static storage is
-    // complete, so that they outlive it and the record of its end.
+    // Creates the logger and Boost.Log's core before a guard with static storage is complete, so
+    // that they outlive the guard and the record of its end.
     static_cast<void>(logger().is_logging_enabled());
     git_libgit2_init();
     try
     {
-        // The records keep their addresses: the nodes of the map are moved.
+        // The records keep their addresses, because the nodes of the map are moved.
         *drivers_ = registerMergeDrivers();
     }
     catch (...)

@@ -9,8 +9,8 @@
 namespace vclink::git
 {
 
-// "%A" stands twice: the tool's result goes there. Of the launchers only this one has an extension,
-// and "$LOCAL" alone has no "$PWD/": both are meant.
+// "%A" appears twice: the tool writes its result there. Intentionally, only this launcher has an
+// extension, and only "$LOCAL" has no "$PWD/".
 ToolCommand autoMergeDriver()
 {
     return {{"merge", "vkAutoMerge", "driver"}, u"vkAutoMerge", u".sh", "%O %A %B %A"};

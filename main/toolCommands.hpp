@@ -6,7 +6,7 @@
 
 #include "fl/ustring.hpp"
 
-/// The host's tools as Git's configuration names them.
+/// The host's tools in Git's configuration.
 namespace vclink::git
 {
 
@@ -18,7 +18,7 @@ struct ConfigKey
     std::string name;
 };
 
-/// One tool: where its command stands, which launcher it starts, and with what.
+/// One tool: the key of its command, its launcher and the arguments.
 struct ToolCommand
 {
     ConfigKey key;
@@ -32,14 +32,14 @@ ToolCommand autoMergeDriver();
 ToolCommand mergeTool();
 ToolCommand diffTool();
 
-/// section.subsection.name, or section.name.
+/// Returns section.subsection.name, or section.name.
 std::string configKeyString(const ConfigKey &key);
 
-/// The launcher's place below the host's place of installation, with forward slashes, UTF-8.
+/// Returns the launcher's path below the host's installation folder, with forward slashes, UTF-8.
 std::string toolLauncherPath(const ToolCommand &tool);
 
-/// The launcher in double quotes, a blank and the arguments. A double quote in the launcher is not
-/// escaped.
+/// Returns the launcher in double quotes, a blank and the arguments. Does not escape a double quote
+/// in the launcher.
 std::string quotedCommand(const std::string &launcher, const std::string &arguments);
 
 } // namespace vclink::git

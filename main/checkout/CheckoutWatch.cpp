@@ -51,13 +51,13 @@ Finding ask(const Rules &rules, WorkingCopy &copy, const Subject &subject)
     return {};
 }
 
-/// Owner of what git_merge_bases gives.
+/// Owns the result of git_merge_bases.
 class MergeBases
 {
   public:
-    /// None of unrelated histories.
+    /// Has none for unrelated histories.
     MergeBases(git_repository *repository, const git_oid *ours, const git_oid *theirs)
-        // So that what a failing call has left is released.
+        // Delegates, so that the destructor releases what a failing call has left.
         : MergeBases()
     {
         const GitResult<void> found = call(git_merge_bases, &array_, repository, ours, theirs);
@@ -126,14 +126,15 @@ CheckoutWatch::CheckoutWatch(CheckoutKind kind, git_repository *repository,
     record.notify_payload = this;
     record.progress_cb = passProgress;
     record.progress_payload = this;
-    // A link or a FIFO that comes later must not be written through, or wait for a reader, either.
+    // A link or a FIFO that appears later must not be written through, or wait for a reader,
+    // either.
     record.file_open_flags = O_CREAT | O_TRUNC | O_WRONLY | O_NOFOLLOW | O_NONBLOCK;
 }
 
 WorkingCopy &CheckoutWatch::lookAtWorkingCopy()
 {
     WorkingCopy &copy = copy_.emplace(repository_);
-    // Else libgit2 reads HEAD once more. Without an index it has to: that is a first checkout.
+    // Otherwise libgit2 reads HEAD again. Without an index it must: that is a first checkout.
     if (standingAt(git_index_path(copy.index())) != Standing::Nothing)
     {
         record_.baseline = copy.head();
@@ -182,7 +183,7 @@ void CheckoutWatch::lookBeforeMerge(const git_oid *theirs)
     Finding first = findHiddenEdit(copy);
     Finding yielding;
     bool mayBeRenamed = false;
-    // Histories that are unrelated have the empty tree in common.
+    // Unrelated histories have the empty tree in common.
     for (std::size_t i = 0; i == 0 || i < bases.size(); ++i)
     {
         const OwnedHandle<git_tree> before =
@@ -253,7 +254,7 @@ int CheckoutWatch::pass(git_checkout_notify_t why, const char *path, const git_d
     }
 }
 
-/// After the last notification, and before libgit2 writes.
+/// Runs after the last notification, and before libgit2 writes.
 void CheckoutWatch::passProgress(const char *path, std::size_t completed, std::size_t total,
                                  void *payload) noexcept
 {
@@ -292,7 +293,7 @@ int CheckoutWatch::hear(const CheckoutNotice &notice)
     {
         return 0;
     }
-    // A merge's commands may have run for minutes since the look before.
+    // The commands of a merge may have run for minutes since the first look.
     if (!std::exchange(hasHeard_, true))
     {
         copy_->forgetWays();
@@ -329,8 +330,9 @@ void CheckoutWatch::noteUntracked(const CheckoutNotice &notice)
     }
 }
 
-/// Removes what no rule keeps and libgit2 would go through or fail at: where a new file comes, an
-/// ignored link; where any file comes, an empty folder that libgit2 is past.
+/// Removes what no rule protects and libgit2 would write through or fail at: an ignored link in the
+/// place of a new file, and an empty folder in the place of any file if libgit2 has already passed
+/// it.
 void CheckoutWatch::makeWay(const CheckoutNotice &notice)
 {
     const bool isNew = notice.baseline == nullptr;
@@ -354,8 +356,8 @@ void CheckoutWatch::makeWay(const CheckoutNotice &notice)
     }
 }
 
-/// What libgit2 sees in the way of a revert it replaces itself; what it is past would stop it in
-/// the midst of its writing.
+/// libgit2 itself replaces what it sees in the way of a revert. What it has already passed would
+/// stop it in the middle of its writing.
 Finding CheckoutWatch::clearAll(const CheckoutNotice &notice)
 {
     if (notice.target == nullptr)

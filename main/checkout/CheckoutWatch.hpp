@@ -22,51 +22,51 @@ namespace vclink::git
 
 enum class CheckoutKind
 {
-    /// A switch or a fast-forward, under the strategy GIT_CHECKOUT_SAFE.
+    /// A switch or a fast-forward, with the strategy GIT_CHECKOUT_SAFE.
     Switch,
-    /// A merge, by force.
+    /// A merge, with force.
     Merge,
-    /// A revert, by force, of what the user lists.
+    /// A revert of the user's list, with force.
     Revert
 };
 
-/// Watches over one checkout: nothing is lost that Git cannot give back, and nothing is written
-/// through a link or waits for a FIFO. libgit2 tells of most files before it writes the first, and
-/// what it does not tell of is looked at before.
+/// Watches one checkout, so that nothing is lost that Git cannot restore, and nothing is written
+/// through a link or waits for a FIFO. libgit2 reports most files before it writes the first one;
+/// the watch examines the others before.
 ///
-/// A switch and a merge are refused with GIT_ECONFLICT, class GIT_ERROR_CHECKOUT and a text that
-/// names the first file; nothing is written then. A revert clears the way, as git does: it replaces
-/// the links, FIFOs, sockets and devices that are in it.
+/// Refuses a switch or a merge with GIT_ECONFLICT, class GIT_ERROR_CHECKOUT and a text that names
+/// the first file, before anything is written. Clears the way of a revert, as git does: replaces
+/// the links, FIFOs, sockets and devices in it.
 ///
-/// A switch and a merge are also refused, with GIT_EMODIFIED, if HEAD has moved since the look
-/// before. If it moves after that, what is written is still what HEAD then was, so that files of
-/// the new commit are not deleted.
+/// Also refuses a switch or a merge, with GIT_EMODIFIED, if HEAD has moved since the first look. If
+/// HEAD moves later, the checkout still compares with the HEAD that was read, so that files of the
+/// new commit are not deleted.
 ///
-/// The record's own notification is asked first, so that a cancellation comes before a refusal; it
-/// is told of what is refused as of any other conflict. The record's progress tells when libgit2
-/// begins to write, and is handed on.
+/// Calls the record's own notification first, so that a cancellation comes before a refusal. It
+/// receives a refused file like any other conflict. The record's progress callback shows when
+/// libgit2 begins to write, and is called too.
 class CheckoutWatch
 {
   public:
     /// @param repository outlives the watch
-    /// @param record outlives the watch; its notification and its progress are taken over, and its
-    /// baseline set by the look before
+    /// @param record outlives the watch, which replaces its notification and its progress callback;
+    /// the first look sets its baseline
     [[nodiscard]] CheckoutWatch(CheckoutKind kind, git_repository *repository,
                                 git_checkout_options &record);
     CheckoutWatch(const CheckoutWatch &) = delete;
     CheckoutWatch &operator=(const CheckoutWatch &) = delete;
     ~CheckoutWatch() = default;
 
-    /// To be called before the checkout of `target`, a commit, tag or tree.
+    /// The first look. Call it before the checkout of `target`, a commit, tag or tree.
     /// @throws LibGit2Exception if something is in the way or cannot be examined, and what the
-    /// record's own notification raises
+    /// record's own notification throws
     void lookBeforeSwitch(const git_object *target);
-    /// As lookBeforeSwitch, before the commit `theirs` is merged into HEAD.
+    /// As lookBeforeSwitch, for the merge of the commit `theirs` into HEAD.
     void lookBeforeMerge(const git_oid *theirs);
 
-    /// To be called after the checkout or the merge that was looked at before: the entries of
-    /// submodules in the index become what the target or the merge has, while their folders stay.
-    /// Writes the index if there is anything to change.
+    /// Sets the entries of submodules in the index to those of the target or the merge, and keeps
+    /// their folders. Writes the index if something changes. Call it after the checkout or the
+    /// merge.
     /// @throws LibGit2Exception
     void settleSubmodules() const;
 
@@ -94,14 +94,15 @@ class CheckoutWatch
     git_checkout_progress_cb progress_;
     void *progressPayload_;
     std::string root_;
-    /// Empty until the look before; a revert needs none.
+    /// Empty until the first look. A revert needs none.
     std::optional<WorkingCopy> copy_;
     SwitchSubmodules switched_;
     MergeSubmodules merged_;
-    /// The record's, while a switch keeps submodules.
+    /// The record's own value, while a switch keeps submodules.
     OwnedHandle<git_index> baseline_;
     bool hasHeard_ = false;
-    /// What libgit2 itself replaces, as the last notification with something there has told.
+    /// What libgit2 itself replaces, according to its last notification with something in that
+    /// place.
     std::string replaced_;
     ClearedWay cleared_;
     HardLinks hardLinks_;

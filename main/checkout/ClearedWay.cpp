@@ -41,7 +41,8 @@ void ClearedWay::remove(const std::string &path)
     }
 }
 
-/// Fails if something has come into the place, which stays: after a checkout, everywhere.
+/// Fails if something else is in the place, and keeps that: after a checkout this is so in every
+/// place.
 void ClearedWay::putBack(const Removed &removed)
 {
     const char *const path = removed.path.c_str();

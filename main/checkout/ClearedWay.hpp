@@ -9,9 +9,8 @@
 namespace vclink::git
 {
 
-/// Removes what a checkout would go through or block at, before it writes. At its end it puts back
-/// what nothing has come into the place of: that is all of it after a checkout that failed or was
-/// cancelled.
+/// Removes what a checkout would write through or block at. At its end, restores everything whose
+/// place is still free: that is all of it after a checkout that failed or was cancelled.
 class ClearedWay
 {
   public:

@@ -7,20 +7,20 @@
 namespace vclink::git
 {
 
-/// The files that a checkout writes over and that have further names. libgit2 writes into the file
-/// that is there, so that it changes under all its names, in other folders too; git makes a new
-/// file for the one name.
+/// The files that a checkout overwrites and that have other names. libgit2 writes into the existing
+/// file, which then changes under all its names, even in other folders. git makes a new file for
+/// the one name.
 class HardLinks
 {
   public:
-    /// To be called for each file before the checkout writes the first.
-    /// @param path absolute; a file with one name, or no file at all, is left out
+    /// Notes a file. Call it for each file before the checkout writes the first one.
+    /// @param path absolute; ignored if the file does not exist or has only one name
     /// @return false if its name cannot be removed
     /// @throws LibGit2Exception if the path cannot be examined
     bool note(const std::string &path);
 
-    /// Removes the names that were noted, right before the checkout writes. The content stays under
-    /// the others.
+    /// Removes the noted names. Call it right before the checkout writes. The content stays under
+    /// the other names.
     void part() noexcept;
 
   private:

@@ -23,7 +23,7 @@ bool isInConflict(git_index *index, const std::string &path)
 
 void MergeSubmodules::noteChange(WorkingCopy &copy, const TreeChange &change)
 {
-    // What ours has removed and they have moved is in conflict.
+    // A submodule that we removed and they moved is in conflict.
     const bool isComing = isGitlink(change.after) && change.before == nullptr &&
                           copy.entryOf(change.path) == nullptr &&
                           copy.at(change.path) == Standing::Folder &&
@@ -45,7 +45,7 @@ void MergeSubmodules::stage(git_index *index) const
 
 void MergeSubmodules::noteUntracked(const WorkingCopy &copy, const std::string &name)
 {
-    // In a merge that libgit2 goes on with nothing is staged but what it will have.
+    // If libgit2 continues with a merge, only the content of its result is staged.
     if (isGitlink(copy.entryOf(name)))
     {
         going_.push_back(name);
@@ -61,7 +61,7 @@ void MergeSubmodules::settle(git_index *index) const
 {
     for (const std::string &path : going_)
     {
-        // It is told of twice.
+        // libgit2 reports it twice.
         const bool isLeft = isGitlink(git_index_get_bypath(index, path.c_str(), 0));
         if (isLeft && !isInConflict(index, path))
         {

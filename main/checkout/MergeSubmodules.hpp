@@ -13,29 +13,30 @@
 namespace vclink::git
 {
 
-/// The submodules that come or go in a merge, whose folders stay as they are. libgit2 refuses to
-/// merge where the folder of one that comes is there already, and leaves the entry of one that goes
-/// in the index.
+/// The submodules that a merge adds or removes, and whose folders it keeps. libgit2 refuses to
+/// merge if the folder of a new submodule already exists, and leaves the entry of a removed one in
+/// the index.
 class MergeSubmodules
 {
   public:
-    /// Looks at what the other side has changed.
+    /// Examines a change of the other side.
     void noteChange(WorkingCopy &copy, const TreeChange &change);
 
-    /// Stages the submodules that come, in memory only. What is staged as the merge will have it is
-    /// no change that libgit2 refuses to overwrite; if the merge has something else in the end, it
-    /// is refused as for anything staged. git_index_add.
+    /// Stages the new submodules, in memory only. libgit2 does not refuse to overwrite a staged
+    /// entry that equals the result of the merge. If the result is different, it refuses, as for
+    /// every staged change. git_index_add.
     /// @throws LibGit2Exception
     void stage(git_index *index) const;
 
-    /// Looks at what is untracked in the result of the merge.
-    /// @param name of a folder
+    /// Examines something that is untracked in the result of the merge.
+    /// @param name the name of a folder
     void noteUntracked(const WorkingCopy &copy, const std::string &name);
 
-    /// Whether there is nothing to settle.
+    /// Returns true if there is nothing to do afterwards.
     bool isEmpty() const noexcept;
 
-    /// Takes what is gone out of the index, in memory, unless it is in conflict. git_index_remove.
+    /// Removes the removed submodules from the index, in memory, except those in conflict.
+    /// git_index_remove.
     /// @throws LibGit2Exception
     void settle(git_index *index) const;
 

@@ -33,7 +33,7 @@ Obstacle inTheWay(const std::string &name, Standing standing)
 
 Obstacle inChangedFolder(const std::string &name, Standing standing)
 {
-    // It may be staged, and so no untracked file.
+    // It can be staged, so it is not necessarily untracked.
     const char *const what = standing == Standing::File ? "the file " : describe(standing);
     return {name, what + ("'" + name) + "' is in a folder that becomes a file"};
 }

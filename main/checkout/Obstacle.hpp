@@ -9,21 +9,21 @@
 namespace vclink::git
 {
 
-/// What a checkout is refused for.
+/// The reason to refuse a checkout.
 struct Obstacle
 {
     std::string path;
-    /// what is there, and how it gets out of the way if that is not obvious
+    /// what is in the way, and how to remove it if that is not obvious
     std::string text;
 };
 
-/// What a rule finds: nothing, if it has no objection.
+/// The result of a rule: nothing if it does not object.
 using Finding = std::optional<Obstacle>;
 
-/// Something that the checkout would write to, delete or stop at.
+/// Something that the checkout would write to, delete or fail at.
 Obstacle inTheWay(const std::string &name, Standing standing);
 
-/// The same, in a folder that becomes a file.
+/// The same in a folder that becomes a file.
 Obstacle inChangedFolder(const std::string &name, Standing standing);
 
 } // namespace vclink::git

@@ -12,7 +12,8 @@ namespace vclink::git
 namespace
 {
 
-/// libgit2 takes the first checkout of a repository, which has no index yet, for one onto nothing.
+/// libgit2 treats the first checkout of a repository, which has no index yet, as a checkout into an
+/// empty working tree.
 bool isFirstCheckout(const WorkingCopy &copy)
 {
     return standingAt(git_index_path(copy.index())) == Standing::Nothing;
@@ -81,7 +82,8 @@ void SwitchSubmodules::settle(git_index *index) const
 {
     for (const std::string &path : going_)
     {
-        // It is gone already if the user has taken it out of the index, or a folder has come.
+        // The entry is already gone if the user has removed it from the index, or if a folder
+        // replaces it.
         if (isGitlink(git_index_get_bypath(index, path.c_str(), 0)))
         {
             check(git_index_remove, index, path.c_str(), 0);

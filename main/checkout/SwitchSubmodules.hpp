@@ -14,28 +14,29 @@
 namespace vclink::git
 {
 
-/// The submodules that come or go in a switch or a fast-forward. git never touches the folder of
-/// one; libgit2 deletes it with all it holds where the submodule goes, and deletes an ignored
-/// folder or fails at another one where a submodule comes. So the checkout gets a baseline in which
-/// these submodules are as in the target, and has nothing to do for them. Their entries in the
-/// index are settled afterwards.
+/// The submodules that a switch or a fast-forward adds or removes. git never touches their folders.
+/// libgit2 deletes the folder of a removed submodule with all its content. In the place of a new
+/// submodule it deletes an ignored folder, and fails at any other. Therefore the checkout gets a
+/// baseline in which these submodules are as in the target, and does nothing for them. Their
+/// entries in the index are set afterwards.
 class SwitchSubmodules
 {
   public:
-    /// Looks at one change of the switch.
-    /// @return whether a folder is to be kept, which libgit2 deletes under GIT_CHECKOUT_FORCE
-    /// whatever the baseline holds
+    /// Examines one change of the switch.
+    /// @return true if a folder must be kept; with GIT_CHECKOUT_FORCE libgit2 deletes it whatever
+    /// the baseline is
     bool note(WorkingCopy &copy, const TreeChange &change);
 
-    /// Whether HEAD's tree, which is libgit2's own baseline, will do.
+    /// Returns true if HEAD's tree, libgit2's own baseline, is sufficient.
     bool isEmpty() const noexcept;
 
-    /// An index in memory for the checkout's `baseline_index`. git_index_new, git_index_read_tree,
-    /// git_index_remove, git_index_add.
+    /// Returns an index in memory for the checkout's `baseline_index`. git_index_new,
+    /// git_index_read_tree, git_index_remove, git_index_add.
     /// @throws LibGit2Exception
     [[nodiscard]] OwnedHandle<git_index> makeBaseline(const WorkingCopy &copy) const;
 
-    /// Brings the index, in memory, to what the target has. git_index_remove, git_index_add.
+    /// Sets the entries in the index, in memory, to those of the target. git_index_remove,
+    /// git_index_add.
     /// @throws LibGit2Exception
     void settle(git_index *index) const;
 
@@ -48,11 +49,11 @@ class SwitchSubmodules
 
     void addComing(git_index *index) const;
 
-    /// A folder with files is in the place.
+    /// Those that have a folder with files in their place.
     std::vector<Coming> coming_;
     std::vector<std::string> going_;
-    /// Submodules that become files, and files that become submodules, while nothing is there:
-    /// libgit2 makes the new one only if the baseline does not have the old one.
+    /// Submodules that become files, and files that become submodules, if nothing is in their
+    /// place: libgit2 creates the new one only if the baseline does not have the old one.
     std::vector<std::string> replaced_;
 };
 

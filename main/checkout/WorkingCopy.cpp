@@ -142,7 +142,7 @@ WorkingCopy::Way WorkingCopy::wayInto(const std::string &folder, const Way &abov
     {
         return {standing, isReplaced && holdsFiles(folder) ? folder : ""};
     }
-    // A file or link that HEAD has goes first, if it is unchanged.
+    // An unchanged file or link of HEAD is removed first.
     const bool goesFirst = isReplaced && standing != Standing::Special;
     return goesFirst ? Way{Standing::Nothing, ""} : Way{standing, folder};
 }
@@ -218,7 +218,7 @@ bool WorkingCopy::isEdited(const git_index_entry &entry)
     return standing == Standing::Special || (standing == Standing::Folder && holdsFiles(name));
 }
 
-/// The id of what is there as git would store it.
+/// Returns the id of the file as git would store it.
 git_oid WorkingCopy::idOf(const std::string &name, Standing standing) const
 {
     git_oid id{};
@@ -236,7 +236,7 @@ git_oid WorkingCopy::idOf(const std::string &name, Standing standing) const
     return id;
 }
 
-/// GIT_OBJECT_INVALID if HEAD does not have the name.
+/// Returns GIT_OBJECT_INVALID if HEAD does not have the name.
 git_object_t WorkingCopy::typeInHead(const std::string &name) const
 {
     if (head_ == nullptr)

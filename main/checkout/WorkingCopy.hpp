@@ -15,8 +15,8 @@
 namespace vclink::git
 {
 
-/// What the rules of a checkout look at: the working tree, the index and HEAD's tree. Names are
-/// relative to the root. Each operation throws LibGit2Exception if it cannot find out.
+/// The working tree, the index and HEAD's tree, for the rules of a checkout. Names are relative to
+/// the root. Each operation throws LibGit2Exception if it cannot find out.
 class WorkingCopy
 {
   public:
@@ -24,54 +24,54 @@ class WorkingCopy
     /// @param repository outlives the object
     explicit WorkingCopy(git_repository *repository);
 
-    /// HEAD's tree, null on an unborn branch.
+    /// Returns HEAD's tree, null on an unborn branch.
     git_tree *head() const noexcept
     {
         return head_.get();
     }
-    /// Whether HEAD is no longer what it was then.
+    /// Returns true if HEAD has moved since construction.
     [[nodiscard]] bool hasHeadMoved() const;
     git_index *index() const noexcept
     {
         return index_.get();
     }
 
-    /// Nothing, if something other than a folder is above.
+    /// Returns what is at a name: nothing if something above it is not a folder.
     Standing at(const std::string &name);
     /// See vclink::git::holdsFiles.
     bool holdsFiles(const std::string &folder) const;
 
-    /// Whether something beside the folder has a name that sorts between the folder's own and the
-    /// folder's with a slash at its end, e.g. "lib-1" for "lib". The folder is there.
+    /// Returns true if a name in the same folder sorts between the folder's name and that name with
+    /// a slash appended, e.g. "lib-1" for "lib". The folder must exist.
     bool hasSiblingBeforeFolder(const std::string &folder) const;
 
-    /// What is above a name. `blocker` is empty where folders lead there, or where there is
-    /// nothing; else it is the name of the first thing that keeps a file from being written there:
-    /// something that is no folder, or a folder with files in the place of a file of HEAD.
+    /// What is above a name. `blocker` is empty if folders lead there, or if there is nothing.
+    /// Otherwise it is the name of the first thing that prevents a file there: something that is
+    /// not a folder, or a folder with files in the place of a file of HEAD.
     struct Way
     {
         Standing standing = Standing::Folder;
         std::string blocker;
     };
-    /// Remembers the folders that it has seen.
+    /// Returns what is above a name. Remembers the folders that it has seen.
     const Way &wayTo(const std::string &name);
     void forgetWays();
 
-    /// The index's entry, null if there is none that is merged.
+    /// Returns the index's entry, null if there is none without a conflict.
     const git_index_entry *entryOf(const std::string &name) const;
     bool isInHead(const std::string &name) const;
-    /// Whether HEAD has a folder of this name.
+    /// Returns true if HEAD has a folder of this name.
     bool isFolderInHead(const std::string &name) const;
-    /// The first thing in the folder, at any depth, that HEAD does not have: untracked, ignored or
-    /// added to the index. Empty if there is none.
+    /// Returns the first thing in the folder, at any depth, that HEAD does not have: untracked,
+    /// ignored or added to the index. Empty if there is none.
     std::string foreignBelow(const std::string &folder) const;
-    /// The first name below the folder that the index has and HEAD does not. Empty if there is
-    /// none.
+    /// Returns the first name below the folder that the index has and HEAD does not. Empty if there
+    /// is none.
     std::string stagedBelow(const std::string &folder) const;
     /// git_ignore_path_is_ignored.
     bool isIgnored(const std::string &name) const;
-    /// Whether the file, link or folder differs from its entry in the index, by content. A missing
-    /// file does not.
+    /// Returns true if the content of the file, link or folder differs from its entry in the index.
+    /// A missing file does not differ.
     bool isEdited(const git_index_entry &entry);
 
   private:

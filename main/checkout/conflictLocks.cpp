@@ -18,7 +18,7 @@ namespace vclink::git
 namespace
 {
 
-/// Owner of what git_merge_file_from_index gives.
+/// Owns the result of git_merge_file_from_index.
 class MergedFile
 {
   public:
@@ -48,7 +48,7 @@ git_index_entry entryOf(const std::string &path, const git_tree_entry *side)
     return entry;
 }
 
-/// What a command does cannot be known before.
+/// The result of a command cannot be known in advance.
 bool hasCommand(git_repository *repository, const std::string &path)
 {
     const char *value = nullptr;
@@ -56,7 +56,7 @@ bool hasCommand(git_repository *repository, const std::string &path)
     return git_attr_value(value) == GIT_ATTR_VALUE_STRING;
 }
 
-/// Whether the lines cannot be joined.
+/// Returns true if the lines conflict.
 bool isConflict(git_repository *repository, const git_index_entry &ours, const TreeChange &change)
 {
     const git_index_entry theirs = entryOf(change.path, change.after);
@@ -85,7 +85,7 @@ bool isInTree(const git_tree *tree, const std::string &path)
     return true;
 }
 
-/// A tracked file that is missing comes back before the conflicts are written.
+/// A missing tracked file is restored before the conflicts are written.
 bool isThere(WorkingCopy &copy, const std::string &path, const git_tree *theirs)
 {
     return copy.at(path) != Standing::Nothing || copy.entryOf(path) != nullptr ||

@@ -10,11 +10,10 @@
 namespace vclink::git
 {
 
-/// A rule of a merge: something whose name is that of a file in conflict with ".lock" behind it,
-/// e.g. "Gemfile.lock". While libgit2 writes the conflict this is the name of its own temporary
-/// file, and it would give up in the midst of its writing. Files that only a rename brings together
-/// are not looked at.
-/// @param theirs the other side's tree, where such a name may come from
+/// A rule of a merge: finds a name that is the name of a file in conflict with ".lock" appended,
+/// e.g. "Gemfile.lock". libgit2 uses this name for its temporary file while it writes the conflict,
+/// and would fail in the middle of its writing. Does not examine files that only a rename combines.
+/// @param theirs the other side's tree, which can add such a name
 /// @throws LibGit2Exception
 Finding findLockOfConflict(git_repository *repository, WorkingCopy &copy, const TreeChange &change,
                            const git_tree *theirs);

@@ -9,11 +9,11 @@
 
 #include "error/errorUtil/GitResult.hpp"
 
-/// Entries of submodules, which git calls gitlinks.
+/// Index entries of submodules, which git calls gitlinks.
 namespace vclink::git
 {
 
-/// Null is none.
+/// Returns false for null.
 inline bool isGitlink(const git_tree_entry *entry)
 {
     return entry != nullptr && git_tree_entry_filemode(entry) == GIT_FILEMODE_COMMIT;

@@ -17,14 +17,14 @@ bool isFolder(const git_diff_file *file)
     return file != nullptr && S_ISDIR(file->mode);
 }
 
-/// Whether the checkout is going to make a file or link here.
+/// Returns true if the checkout will create a file or link here.
 bool makesFile(const CheckoutNotice &notice)
 {
     return notice.why == GIT_CHECKOUT_NOTIFY_UPDATED && notice.target != nullptr &&
            !isGitlink(notice.target) && !isFolder(notice.target);
 }
 
-/// The name of what is there, which may be something above the path.
+/// Returns the name of what is in the place, which can be something above the path.
 std::string nameOf(const git_diff_file &workdir)
 {
     std::string name = workdir.path;
@@ -54,7 +54,7 @@ Finding findUnseen(WorkingCopy &copy, const CheckoutNotice &notice)
     const Standing standing = copy.at(name);
     if (standing == Standing::Folder && copy.isFolderInHead(name))
     {
-        // What HEAD has there goes first.
+        // libgit2 first removes what HEAD has there.
         const std::string foreign = copy.foreignBelow(name);
         return foreign.empty() ? Finding() : inChangedFolder(foreign, copy.at(foreign));
     }

@@ -6,12 +6,12 @@
 #include "main/checkout/Obstacle.hpp"
 #include "main/checkout/WorkingCopy.hpp"
 
-/// The rules that judge what libgit2 tells before it writes the first file. For a merge this is
-/// after its commands have run, so that they see what was saved meanwhile.
+/// The rules for the files that libgit2 reports before it writes the first one. In a merge they run
+/// after its commands, so that they see what was saved in between.
 namespace vclink::git
 {
 
-/// The arguments of git_checkout_notify_cb. A folder's name in `workdir` ends with a slash.
+/// The arguments of git_checkout_notify_cb. The name of a folder in `workdir` ends with a slash.
 struct CheckoutNotice
 {
     git_checkout_notify_t why;
@@ -21,30 +21,30 @@ struct CheckoutNotice
     const git_diff_file *workdir;
 };
 
-// Of every checkout.
+// For every checkout.
 
-/// What libgit2 did not see where it is going to write: a FIFO, a socket or a device, a link or a
-/// file above that its walk is past, a folder in the place of a file.
+/// Finds what libgit2 did not see in a place where it will write: a FIFO, a socket or a device, a
+/// link or a file above that its walk has already passed, a folder in the place of a file.
 Finding findUnseen(WorkingCopy &copy, const CheckoutNotice &notice);
 
-// Of a switch or a fast-forward.
+// For a switch or a fast-forward.
 
-/// A missing file that becomes a folder: libgit2 would fail in the midst of its writing.
+/// Finds a missing file that becomes a folder: libgit2 would fail in the middle of its writing.
 Finding findMissingFile(WorkingCopy &copy, const CheckoutNotice &notice);
 
-// Of a merge, which would undo, overwrite or delete these.
+// For a merge, which would undo, overwrite or delete these.
 
-/// A change of a tracked file. Changes in a submodule stay, and are none.
+/// Finds a change of a tracked file. Changes in a submodule stay and do not count.
 Finding findEdit(WorkingCopy &copy, const CheckoutNotice &notice);
-/// Something untracked where a file comes, unless it is ignored.
+/// Finds something untracked in the place of a new file, unless it is ignored.
 Finding findUntrackedNoticed(WorkingCopy &copy, const CheckoutNotice &notice);
-/// Something that HEAD does not have in a folder that becomes a file.
+/// Finds something that HEAD does not have in a folder that becomes a file.
 Finding findForeignInFolderNoticed(WorkingCopy &copy, const CheckoutNotice &notice);
-/// A folder with files in the place of a tracked file.
+/// Finds a folder with files in the place of a tracked file.
 Finding findFolderNoticed(WorkingCopy &copy, const CheckoutNotice &notice);
-/// A submodule with files that becomes a file.
+/// Finds a submodule with files that becomes a file.
 Finding findSubmoduleNoticed(WorkingCopy &copy, const CheckoutNotice &notice);
-/// A change that Git hides; see findHiddenEdit.
+/// Finds a change that Git hides; see findHiddenEdit.
 Finding findHiddenEditNoticed(WorkingCopy &copy, const CheckoutNotice &notice);
 
 } // namespace vclink::git

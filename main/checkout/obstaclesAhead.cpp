@@ -13,14 +13,15 @@ namespace vclink::git
 namespace
 {
 
-/// Whether the checkout makes a file or link here.
+/// Returns true if the checkout creates a file or link here.
 bool makesFile(const TreeChange &change)
 {
     return change.after != nullptr && !isGitlink(change.after);
 }
 
-/// Whether ours has deleted the file that theirs has changed. libgit2 writes such a file without a
-/// word before: it opens whatever is there, goes through links, and fails in the midst otherwise.
+/// Returns true if we have deleted the file that they have changed. libgit2 writes such a file
+/// without a notification: it opens whatever is in its place, follows links, and otherwise fails in
+/// the middle of its writing.
 bool isWrittenUnnoticed(WorkingCopy &copy, const TreeChange &change)
 {
     return change.before != nullptr && makesFile(change) && copy.entryOf(change.path) == nullptr;
@@ -130,8 +131,8 @@ Finding findStagedContent(WorkingCopy &copy, const TreeChange &change)
     {
         return {};
     }
-    // The same content in the file is a conflict, which libgit2 finds unless it is not told of what
-    // was there before.
+    // The same content in the file is a conflict, which libgit2 finds if the baseline has the old
+    // content.
     if (!isGitlink(change.before) && copy.at(change.path) != Standing::Nothing &&
         !copy.isEdited(*entry))
     {

@@ -46,7 +46,7 @@ bool holdsFiles(const std::string &path)
     {
         return false;
     }
-    // The iterators of the standard library end the process if memory runs out.
+    // The standard library's iterators end the process if memory runs out.
     const std::unique_ptr<DIR, int (*)(DIR *)> folder(::opendir(path.c_str()), ::closedir);
     if (folder == nullptr)
     {

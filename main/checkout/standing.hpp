@@ -13,21 +13,21 @@ enum class Standing
     File,
     Link,
     Folder,
-    /// A FIFO, a socket or a device: opening one may block for ever.
+    /// A FIFO, a socket or a device: opening one can block forever.
     Special
 };
 
 /// @param path absolute
-/// @throws LibGit2Exception if that cannot be found out
+/// @throws LibGit2Exception if it cannot be found out
 Standing standingAt(const std::string &path);
 
-/// Returns true if this is a folder that holds anything but folders, at any depth; true also if a
-/// folder cannot be read.
+/// Returns true if this is a folder that contains anything except folders, at any depth, or that
+/// cannot be read.
 /// @param path absolute
-/// @throws LibGit2Exception if it cannot be found out what is at the path
+/// @throws LibGit2Exception if the path cannot be examined
 bool holdsFiles(const std::string &path);
 
-/// Returns what a link leads to, empty if it cannot be read.
+/// Returns the target of a link, empty if it cannot be read.
 /// @param path absolute
 std::string readLink(const std::string &path);
 

@@ -16,7 +16,7 @@ namespace vclink::git
 namespace
 {
 
-/// One tree, and how far its entries were read.
+/// One tree, and the position in its entries.
 struct Side
 {
     OwnedHandle<git_tree> owned;
@@ -29,8 +29,8 @@ struct Side
     }
 };
 
-/// A folder of both trees. The levels are kept here and not on the stack, since a repository from
-/// elsewhere decides how deep they go.
+/// A folder of both trees. The levels are here and not on the stack, because a hostile repository
+/// can have any depth.
 struct Level
 {
     Side before;
@@ -50,14 +50,15 @@ bool isFolder(const git_tree_entry *entry)
     return git_tree_entry_type(entry) == GIT_OBJECT_TREE;
 }
 
-/// The byte at this place of a name. A folder's name ends with a slash in the order of a tree.
+/// Returns the byte at this position of a name. In the order of a tree, the name of a folder ends
+/// with a slash.
 unsigned char byteOf(const git_tree_entry *entry, const char *name, std::size_t place)
 {
     const auto byte = static_cast<unsigned char>(name[place]);
     return byte == 0 && isFolder(entry) ? '/' : byte;
 }
 
-/// As git_tree_entry_cmp, without a call for each of many files.
+/// As git_tree_entry_cmp, without a function call for each file.
 int compare(const git_tree_entry *left, const git_tree_entry *right)
 {
     const char *const leftName = git_tree_entry_name(left);
@@ -81,8 +82,8 @@ Side openSide(git_repository *repository, const git_tree_entry *folder)
     return side;
 }
 
-/// The next entry of each side, null on the side that lacks the name. A folder's name and a file's
-/// are never the same one.
+/// Returns the next entry of each side, null for a side without the name. A folder and a file never
+/// count as the same name.
 std::pair<const git_tree_entry *, const git_tree_entry *> takeNext(Level &level)
 {
     const git_tree_entry *before = level.before.current();

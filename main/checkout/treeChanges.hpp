@@ -13,8 +13,8 @@
 namespace vclink::git
 {
 
-/// A file, link or submodule that two trees hold differently. A name that is a folder in one tree
-/// and a file in the other comes as the file and as each file of the folder.
+/// A file, link or submodule that differs between two trees. A name that is a folder in one tree
+/// and a file in the other is reported as the file and as each file of the folder.
 struct TreeChange
 {
     /// relative to the root
@@ -24,15 +24,15 @@ struct TreeChange
     const git_tree_entry *after;
 };
 
-/// Whether the index has what one side has.
+/// Returns true if the index has the entry of one side.
 inline bool isOf(const git_index_entry &entry, const git_tree_entry *side)
 {
     return side != nullptr && isSameId(entry.id, *git_tree_entry_id(side)) &&
            entry.mode == static_cast<unsigned>(git_tree_entry_filemode(side));
 }
 
-/// Visits what differs, in path order, until `visit` returns false. git_diff_tree_to_tree gives the
-/// same for several times the cost. Folders that are equal are not read.
+/// Visits what differs, in path order, until `visit` returns false. Does not read equal folders.
+/// git_diff_tree_to_tree returns the same at several times the cost.
 /// @param before, after null means the empty tree
 /// @throws LibGit2Exception if a tree cannot be read, and what `visit` throws
 void visitTreeChanges(git_repository *repository, const git_tree *before, const git_tree *after,

@@ -25,7 +25,7 @@ using Trees = std::vector<OwnedHandle<git_tree>>;
 
 using TreeEntry = std::unique_ptr<git_tree_entry, void (*)(git_tree_entry *)>;
 
-/// Null if the tree has nothing there.
+/// Returns null if the tree has no entry there.
 TreeEntry findEntry(const git_tree *tree, const std::string &path)
 {
     git_tree_entry *raw = nullptr;
@@ -56,7 +56,8 @@ bool isSubmoduleIn(const Trees &trees, const std::string &path)
                        { return isGitlink(findEntry(tree.get(), path).get()); });
 }
 
-/// Whether ours has removed the submodule that theirs has moved, and its repository is still there.
+/// Returns true if we have removed the submodule that they have moved, and its repository still
+/// exists.
 bool isTheirsAndThere(git_repository *repository, git_index *index, const git_index_entry &theirs)
 {
     const char *const workdir = git_repository_workdir(repository);

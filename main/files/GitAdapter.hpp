@@ -23,19 +23,18 @@ namespace vclink::git
 class IndexLock;
 struct MergeSides;
 
-/// The back end of one working copy. Holds what it needs to open the repository and to build option
+/// The back end of one working copy. Has what it needs to open the repository and to build option
 /// records, and nothing of the repository itself.
 class GitAdapter : public vclink::CMAdapter
 {
   public:
     /// @param interactor not null
     GitAdapter(const upath &root, std::shared_ptr<ApplicationInteractor> interactor);
-    /// @param factory not null, and made with an interactor
+    /// @param factory not null, and created with an interactor
     GitAdapter(const upath &root, std::shared_ptr<GitOptionsFactory> factory);
     ~GitAdapter() override;
 
-    /// What each operation promises: the page adapter_operations in
-    /// vclink/git/GitAdapterFactory.hpp, a section for each.
+    /// The page adapter_operations in vclink/git/GitAdapterFactory.hpp describes each operation.
     /// @{
     void commit(const upath &folder, const ustring &message) override;
     void addFiles(const std::vector<upath> &files) override;
@@ -47,30 +46,31 @@ class GitAdapter : public vclink::CMAdapter
     const upath &getRootFolder() override;
     /// @}
 
-    /// A repository opened for the caller, who owns it.
+    /// Opens the repository. The caller owns it.
     /// @throws LibGit2Exception
     [[nodiscard]] OwnedHandle<git_repository> getRepository() const;
     std::shared_ptr<GitOptionsFactory> getOptionsFactory() const;
     GitCallbacks &getCallbacks() const;
     std::shared_ptr<ApplicationInteractor> getInteractor() const;
-    /// Lets commit() refuse to make any other commit than the one that concludes this merge, and
-    /// take submodules as the index has them, whatever is checked out in them.
-    /// @param sides outlive the commit; null for no merge
+    /// Makes commit() refuse every commit except the one that concludes this merge, and commit
+    /// submodules as in the index, whatever is checked out in them.
+    /// @param sides must outlive the commit; null for no merge
     void expectMerge(const MergeSides *sides) noexcept;
 
   private:
     FileStateMap collectFileStates(char **pathspecStrings, std::size_t pathspecCount);
     void addToIndex(const std::vector<upath> &files);
     void removeFromIndex(const std::vector<upath> &files);
-    /// @param head one of the parents; null if HEAD gives no commit
+    /// @param head one of the parents; null if HEAD has no commit
     void createCommit(git_repository *repository, const ustring &message, const git_commit *head,
                       const std::vector<const git_commit *> &parents, IndexLock &lock);
     void refreshForCommit(git_repository *repository, git_index *index, const git_commit *head,
                           const std::vector<const git_commit *> &parents) const;
-    /// @return the states that it looked at
+    /// @return the examined states
     FileStateMap throwIfConflicted(const std::vector<upath> &files);
 
-    // The guard comes first and goes last: all use of libgit2 by the other members ends before it.
+    // The guard is constructed first and destroyed last, after every use of libgit2 by the other
+    // members.
     LibGit2Guard guard_;
     upath root_;
     std::shared_ptr<GitOptionsFactory> optionsFactory_;

@@ -19,8 +19,8 @@ StatusCallbacks::StatusCallbacks(const upath &walkRoot) : root(walkRoot)
 
 int StatusCallbacks::status(const char *path, unsigned int flags)
 {
-    // libgit2 reports in byte order, which is nearly the map's: the end is a good guess of where
-    // the path belongs, and a wrong one costs a look-up.
+    // libgit2 reports in byte order, which is nearly the map's order. So the end is usually the
+    // place of the path; a wrong guess costs a look-up.
     states.emplace_hint(states.end(), joinRepositoryPath(root, path, nameBuffer_),
                         FileState(mapStatusFlags(flags & statusWord)));
     return 0;

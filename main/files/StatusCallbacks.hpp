@@ -9,16 +9,16 @@
 namespace vclink::git
 {
 
-/// What one status walk collects.
+/// Collects the states of one status walk.
 class StatusCallbacks
 {
   public:
     explicit StatusCallbacks(const upath &walkRoot);
 
-    /// Notes the state of one file; the first report of a path stands. git_status_cb.
+    /// Notes the state of one file. The first report of a path counts. git_status_cb.
     /// @param path relative to the repository's root
     /// @param flags git_status_t bits
-    /// @return 0, so that the walk goes on
+    /// @return 0, so that the walk continues
     int status(const char *path, unsigned int flags);
 
     upath root;

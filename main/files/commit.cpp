@@ -55,9 +55,10 @@ std::vector<OwnedHandle<git_commit>> lookupMergeHeads(git_repository *repository
     return commits;
 }
 
-/// libgit2 1.5 answers with success, and has moved no branch, when it can't write the commit's
-/// object, on a full disk for example. All that tells then is that there is no such object, and the
-/// error record, which stands until the next call. Raises then, and keeps any other failure.
+/// Throws if the commit was not written. If libgit2 1.5 cannot write the commit's object, for
+/// example on a full disk, it reports success and moves no branch. The only signs are that the
+/// object does not exist, and the error record, which stays until the next call. Returns any other
+/// failure.
 GitResult<OwnedHandle<git_object>> lookUpWritten(git_repository *repository, const git_oid &id)
 {
     const GitError failure(GIT_ERROR);
@@ -74,9 +75,9 @@ GitResult<OwnedHandle<git_object>> lookUpWritten(git_repository *repository, con
 void GitAdapter::commit(const upath & /*folder*/, const ustring &message)
 {
     const OwnedHandle<git_repository> repository = openRepository(root_);
-    // From here on nobody else commits, merges or ends a merge in this working copy.
+    // From here no other process commits, merges or ends a merge in this working copy.
     IndexLock lock(repository.get());
-    // Without a commit at HEAD, for whatever reason, the new commit is a root commit.
+    // If HEAD has no commit, for any reason, the new commit is a root commit.
     const GitResult<OwnedHandle<git_commit>> head = lookupCommitByName("HEAD", repository.get());
     std::vector<OwnedHandle<git_commit>> mergeHeads;
     std::vector<const git_commit *> parents;
@@ -126,7 +127,7 @@ void GitAdapter::refreshForCommit(git_repository *repository, git_index *index,
         submodules.takeOut(index);
     }
     refreshIndex(repository, index);
-    // Where HEAD can't be read, nothing tells which commit the user has checked out on purpose.
+    // Without HEAD it is unknown which commit the user has checked out on purpose.
     const std::size_t ours = head != nullptr ? 1 : 0;
     if (expectedMerge_ != nullptr || parents.size() > ours)
     {
@@ -138,19 +139,19 @@ void GitAdapter::createCommit(git_repository *repository, const ustring &message
                               const git_commit *head,
                               const std::vector<const git_commit *> &parents, IndexLock &lock)
 {
-    // First, so that a missing identity fails with nothing touched.
+    // First, so that nothing has changed if there is no identity.
     const OwnedHandle<git_signature> signature = makeSignature(repository);
     const OwnedHandle<git_index> index = getRepositoryIndex(repository);
     refreshForCommit(repository, index.get(), head, parents);
     writeIndex(index.get());
-    // To libgit2 it ends at its first NUL.
+    // For libgit2 it ends at the first NUL.
     const std::string text = fl::i18n::ustring_to_utf8(message);
     const git_oid treeId = writeIndexTree(index.get());
     const OwnedHandle<git_tree> tree = lookupTree(repository, &treeId);
-    // Before HEAD moves: an older index would undo the commit in the next one.
+    // Before HEAD moves: with an older index the next commit would undo this one.
     lock.publish();
     git_oid id{};
-    // libgit2's parameter is not const throughout.
+    // libgit2's parameter is not completely const.
     auto parentPointers = parents;
     check(retryWhileLocked(repository,
                            [&]
@@ -161,7 +162,7 @@ void GitAdapter::createCommit(git_repository *repository, const ustring &message
                                            parentPointers.data());
                            }));
     const GitResult<OwnedHandle<git_object>> written = lookUpWritten(repository, id);
-    // The commit stands, even if its object can't be read just now.
+    // The commit exists, even if its object cannot be read now.
     cleanUpRepositoryState(repository);
     written.value();
 }

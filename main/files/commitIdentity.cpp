@@ -35,8 +35,7 @@ std::string findUserName()
 
 std::string findHostName()
 {
-    // A failure that sets no errno counts as a machine without a name, so an earlier errno must not
-    // be taken for it.
+    // A failure without an errno means a machine without a name, so clear an earlier errno.
     errno = 0;
     return boost::asio::ip::host_name();
 }

@@ -33,8 +33,8 @@ bool isIndexed(git_index *index, const char *path)
     return true;
 }
 
-/// Why a folder above the file can't be listed, so that the refresh misses what stands in it; 0
-/// when all can.
+/// Returns why a folder above the file cannot be listed (the refresh misses its files then), or 0
+/// if all can.
 int findHidingFolder(const std::string &workdir, const std::string &path)
 {
     for (auto end = path.find('/'); end != std::string::npos; end = path.find('/', end + 1))
@@ -61,16 +61,15 @@ bool isBehindLink(const std::string &workdir, const std::string &path)
     return false;
 }
 
-/// Why the file can't be looked at, or could not a moment ago; 0 when it can, and also when it is
-/// gone.
+/// Returns why the file cannot be read, or could not before, or 0 if it can or does not exist.
 int findObstacle(const std::string &workdir, const std::string &path)
 {
     struct stat status = {};
     if (lstat((workdir + path).c_str(), &status) == 0)
     {
         const int error = findHidingFolder(workdir, path);
-        // Something else took its place, a folder perhaps, unless it only can't be seen. A file is
-        // no such thing: the refresh would have taken it as it stands.
+        // Something else, such as a folder, is in its place, unless it only cannot be seen. A file
+        // or link is not something else: the refresh would have staged it.
         const bool isMissed =
             (S_ISREG(status.st_mode) || S_ISLNK(status.st_mode)) && !isBehindLink(workdir, path);
         return error == 0 && isMissed ? EIO : error;
@@ -78,7 +77,7 @@ int findObstacle(const std::string &workdir, const std::string &path)
     return errno == ENOENT || errno == ENOTDIR ? 0 : errno;
 }
 
-/// A file that can't be looked at is there for all one knows. git would fail on it too.
+/// A file that cannot be examined may exist. git fails for it too.
 void refuseUnreadable(const std::string &workdir, const std::string &path)
 {
     const int error = findObstacle(workdir, path);

@@ -6,11 +6,11 @@
 namespace vclink::git
 {
 
-/// Brings every tracked entry of the index up to the working tree, in memory only: modified files
-/// are staged, deleted ones dropped. git_index_update_all, which would also drop entries whose file
-/// is not gone but only not checked out or not readable: the former stay as they were.
-/// @throws LibGit2Exception when the refresh fails, or when a file can't be read; the index is not
-/// to be written then
+/// Updates every tracked entry of the index from the working tree, in memory only: stages modified
+/// files and removes deleted ones. Keeps entries of files that are not checked out, which
+/// git_index_update_all would remove, as it would those of unreadable files. git_index_update_all.
+/// @throws LibGit2Exception if the refresh fails or a file cannot be read; then the index must not
+/// be written
 void refreshIndex(git_repository *repository, git_index *index);
 
 } // namespace vclink::git

@@ -6,9 +6,9 @@
 namespace vclink::git
 {
 
-/// The one state that a file's git_status_t bits come down to. The order of the tests decides: a
-/// conflict beats everything, new in the index beats edited since, changed in the index beats gone
-/// from the working tree, removed from the index beats still on disk.
+/// Returns the one state for a file's git_status_t bits. The order of the tests decides: a conflict
+/// has priority over everything, new in the index over edited since, changed in the index over
+/// missing from the working tree, removed from the index over still on disk.
 FileState::State mapStatusFlags(unsigned int flags) noexcept;
 
 } // namespace vclink::git

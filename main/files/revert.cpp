@@ -27,7 +27,7 @@ namespace vclink::git
 namespace
 {
 
-/// A key of the states without the root's text; empty when it does not lie below the root.
+/// Returns a key of the states without the root's text, empty if it is not below the root.
 std::string nameBelow(const std::string &root, const std::string &key)
 {
     const bool isBelow = key.size() > root.size() && key.compare(0, root.size(), root) == 0 &&
@@ -36,7 +36,7 @@ std::string nameBelow(const std::string &root, const std::string &key)
     return begin == std::string::npos ? std::string() : key.substr(begin);
 }
 
-/// The names, relative to the root, of the changed files that HEAD holds.
+/// Returns the names, relative to the root, of the changed files that HEAD has.
 std::vector<std::string> changedNames(const FileStateMap &states, const upath &root)
 {
     const std::string rootText = fl::i18n::ustring_to_utf8(root.string());
@@ -60,16 +60,16 @@ bool areIndexed(git_index *index, const std::vector<std::string> &names)
                        { return git_index_get_bypath(index, name.c_str(), 0) != nullptr; });
 }
 
-/// A file that is put back takes what was staged below its name out of the index, if these entries
-/// are the index's first. libgit2 then fails to take them out once more, and gives up in the midst
-/// of the list: what is done by then need not be done again.
+/// Returns true if a reset stopped in the middle of the list. A file that is restored removes what
+/// was staged below its name, if these are the first entries of the index. libgit2 then fails to
+/// remove them again, and stops. What is done by then need not be done again.
 bool isHalfDone(const GitResult<void> &reset)
 {
     return reset.has_error() && reset.error().getCode() == GIT_ENOTFOUND &&
            reset.error().getErrorClass() == GIT_ERROR_INDEX;
 }
 
-/// @param files how many may be put back at most
+/// @param files the highest number of restored files
 void resetToHead(git_repository *repository, const git_object *head, const PathspecArray &pathspec,
                  std::size_t files)
 {
@@ -84,12 +84,12 @@ void resetToHead(git_repository *repository, const git_object *head, const Paths
 void resetEntries(git_repository *repository, const git_object *head, const PathspecArray &pathspec,
                   const std::vector<std::string> &names)
 {
-    // The one that the resets and the checkout work on. Left to them, it would be empty where
-    // libgit2 can't look at the file, and hold nothing but these entries afterwards.
+    // The index of the resets and the checkout. Without this call it would be empty if libgit2
+    // cannot read the index file, and would then have only these entries.
     const OwnedHandle<git_index> index = getRepositoryIndex(repository);
     resetToHead(repository, head, pathspec, names.size());
-    // A file whose kind was changed in the index, to a link or from one, is taken out of it by the
-    // first reset, and put back by the second.
+    // If a file became a link in the index, or a link a file, the first reset removes it from the
+    // index and the second one restores it.
     if (head != nullptr && !areIndexed(index.get(), names))
     {
         resetToHead(repository, head, pathspec, names.size());
@@ -126,7 +126,7 @@ void GitAdapter::revertFiles(const std::vector<upath> &files)
     const PathspecArray pathspec = makeFilePathspec(files, root_);
     const OwnedHandle<git_repository> repository = openRepository(root_);
     IndexLock lock(repository.get());
-    // Without a HEAD the reset takes the paths out of the index.
+    // Without a HEAD the reset removes the paths from the index.
     const GitResult<OwnedHandle<git_object>> head = revparseObject(repository.get(), "HEAD");
     const std::vector<std::string> names = changedNames(states, root_);
     resetEntries(repository.get(), head.has_value() ? head.value().get() : nullptr, pathspec,

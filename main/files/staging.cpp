@@ -18,7 +18,7 @@ namespace vclink::git
 namespace
 {
 
-/// Lets libgit2 process every path that matches.
+/// Makes libgit2 process every path that matches.
 int acceptAllPaths(const char * /*path*/, const char * /*matchedPathspec*/, void * /*adapter*/)
 {
     return 0;

@@ -47,7 +47,7 @@ std::string nameBits(unsigned bits, std::initializer_list<std::pair<unsigned, co
     return text;
 }
 
-/// The branch may have moved since the analysis, and must not lose what it has.
+/// The branch may have moved since the analysis, and must not lose commits.
 void refuseMovedBranch(git_repository *repository, const git_reference *head, const git_oid *target)
 {
     const git_oid *const current = git_reference_target(head);
@@ -57,7 +57,7 @@ void refuseMovedBranch(git_repository *repository, const git_reference *head, co
         raiseGitError(GIT_EMODIFIED, GIT_ERROR_MERGE,
                       "the current branch has moved since the merge began");
     }
-    // 1 says that it is ahead.
+    // 1 means that it is ahead.
     if (ahead.error().getCode() < 0)
     {
         ahead.value();
@@ -95,7 +95,7 @@ void BranchMerger::decide(const BranchName &name, git_repository *repository)
     git_merge_analysis_t analysis{};
     git_merge_preference_t preference{};
     const git_annotated_commit *heads[] = {theirs.get()};
-    // The result is not looked at, which is meant: no bit is set then, and the merge itself fails.
+    // Intentionally ignores the result: after a failure no bit is set, and the merge itself fails.
     static_cast<void>(git_merge_analysis(&analysis, &preference, repository, heads, 1));
     writeRecord(SeverityDiagnostic,
                 "Merge Analysis: ", [=] { return mergeAnalysisToText(analysis); });
@@ -147,12 +147,12 @@ void BranchMerger::fastForward(git_repository *repository, git_annotated_commit 
     CheckoutWatch watch(CheckoutKind::Switch, repository, record);
     watch.lookBeforeSwitch(target.get());
     awaitUnlocked(repository, git_reference_name(head.get()));
-    // As it was looked at: what comes later, libgit2 finds when it moves the branch.
+    // The branch as it was read: libgit2 detects a later change when it moves the branch.
     headThen.refuseMoved(repository);
     check(git_checkout_tree, repository, target.get(), &record);
     watch.settleSubmodules();
     lock.publish();
-    // Only now, so that a checkout that fails leaves the branch where it was.
+    // After the checkout, so that the branch stays if the checkout fails.
     retryWhileLocked(
         repository,
         [&] { return acquire<git_reference>(git_reference_set_target, head.get(), id, nullptr); })

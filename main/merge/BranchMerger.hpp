@@ -19,7 +19,7 @@ namespace vclink::git
 class IndexLock;
 struct MergeSides;
 
-/// Carries out one merge. Made for it, and gone with it.
+/// Carries out one merge, and lives only as long as that.
 class BranchMerger
 {
   public:
@@ -29,24 +29,24 @@ class BranchMerger
     BranchMerger(GitAdapter &adapter, std::shared_ptr<GitOptionsFactory> optionsFactory,
                  GitCallbacks &callbacks);
 
-    /// Merges what `name` names into the current branch. See BranchManager::merge.
+    /// Merges a branch or revision into the current branch. See BranchManager::merge.
     /// @throws GitException with the message MergeFailed
     void performMerge(const BranchName &name);
 
-    /// Moves the working tree to `theirs`, and then the current branch.
-    /// @throws LibGit2Exception, vclink::util::exception::CancelledOperationException: the branch
-    /// is where it was
+    /// Changes the working tree to `theirs`, then moves the current branch.
+    /// @throws LibGit2Exception, vclink::util::exception::CancelledOperationException; then the
+    /// branch is unchanged
     void fastForward(git_repository *repository, git_annotated_commit *theirs);
 
     /// Merges the trees, and commits the result.
-    /// @throws the exception of shared_vclink::git::HasConflicts when files are left in conflict,
-    /// LibGit2Exception, and what GitAdapter::commit and the merge drivers raise
+    /// @throws the exception of shared_vclink::git::HasConflicts if files are in conflict,
+    /// LibGit2Exception, and what GitAdapter::commit and the merge drivers throw
     void threeWayMerge(const BranchName &name, git_repository *repository,
                        git_annotated_commit *theirs);
 
   private:
     void decide(const BranchName &name, git_repository *repository);
-    /// To be asked again once the index is locked: until then another process may begin something.
+    /// Call it again when the index is locked: until then another process may begin an operation.
     static void refuseOtherStates(git_repository *repository);
     void commitMerge(const BranchName &name, git_repository *repository, const MergeSides &sides);
     [[noreturn]] void endWithConflicts(git_repository *repository, git_index *index,
@@ -57,12 +57,12 @@ class BranchMerger
     GitCallbacks *callbacks_;
 };
 
-/// Appends the path of an entry in conflict whose content must not be mixed with conflict markers,
-/// by the attributes `merge` and `text` of the file. A missing stage adds nothing.
+/// Appends the path of an entry in conflict if its content must not have conflict markers,
+/// according to the file's attributes `merge` and `text`. Adds nothing for a missing stage.
 void collectUnmergeable(git_repository *repository, std::vector<ustring> &paths,
                         const git_index_entry *entry);
 
-/// For the log: the names of the bits that are set, each with a blank behind it.
+/// Returns the names of the set bits for the log, each followed by a blank.
 std::string mergeAnalysisToText(unsigned analysis);
 std::string mergePreferenceToText(unsigned preference);
 

@@ -36,8 +36,8 @@ namespace vclink::git
 namespace
 {
 
-/// What the working tree's attribute files, and then the index's, say of a file. A failure counts
-/// as no attribute.
+/// Returns an attribute of a file, from the attribute files of the working tree, then of the index.
+/// A failure counts as no attribute.
 git_attr_value_t readAttribute(git_repository *repository, const char *path, const char *name)
 {
     const char *value = nullptr;
@@ -53,8 +53,8 @@ bool isUnmergeable(git_repository *repository, const char *path)
            (text == GIT_ATTR_VALUE_FALSE && merge == GIT_ATTR_VALUE_STRING);
 }
 
-/// libgit2 removes the folder of a submodule in conflict if it is empty, since the submodule is not
-/// populated. A commit would take the submodule for deleted.
+/// Restores the empty folder of a submodule in conflict that is not populated. libgit2 removes it,
+/// and a commit would treat the submodule as deleted.
 void bringFolderBack(git_repository *repository, const git_index_entry *ours)
 {
     if (ours != nullptr && ours->mode == GIT_FILEMODE_COMMIT)
@@ -89,7 +89,7 @@ std::vector<ustring> listUnmergeable(git_repository *repository, git_index *inde
     }
 }
 
-/// As patterns that match these names only.
+/// Returns patterns that match only these names.
 std::vector<ustring> makeExactPatterns(const std::vector<ustring> &paths)
 {
     std::vector<ustring> patterns;
@@ -125,7 +125,7 @@ void BranchMerger::threeWayMerge(const BranchName &name, git_repository *reposit
         toGitCheckoutOptions(options, callbacks_->checkoutCallbacks());
     const git_merge_options mergeRecord = toGitMergeOptions(mergeOptions);
     const git_annotated_commit *heads[] = {theirs};
-    // Outlasts the lock, so that it stands until the index is in place.
+    // Outlives the lock, so that it exists until the index is in place.
     std::optional<MergeMarker> marker;
     IndexLock lock(repository);
     refuseOtherStates(repository);
@@ -143,7 +143,7 @@ void BranchMerger::threeWayMerge(const BranchName &name, git_repository *reposit
     }
     lock.publish();
     marker.reset();
-    // The commit takes it again, for a repository of its own.
+    // The commit acquires it again, for its own repository.
     lock.release();
     commitMerge(name, repository, sides);
 }

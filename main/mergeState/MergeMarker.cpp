@@ -53,7 +53,7 @@ MergeMarker::MergeMarker(git_repository *repository, const MergeSides &sides)
     : path_(markerPath(repository))
 {
     removeMergeMarker(repository);
-    // git's own sign of a merge that is whole. libgit2 leaves it when it ends one.
+    // git's own sign of a complete merge. libgit2 leaves it when it ends one.
     const std::string autoMerge = git_repository_path(repository) + std::string("AUTO_MERGE");
     ::unlink(autoMerge.c_str());
     writeMarker(path_, lineOf(sides.ours) + lineOf(sides.theirs));
@@ -85,7 +85,7 @@ bool hasMergeMarker(git_repository *repository, const git_oid &theirs)
 
 void removeMergeMarker(git_repository *repository) noexcept
 {
-    // An allocation that fails leaves it for the next time.
+    // A failed allocation leaves it for the next time.
     try
     {
         ::unlink(markerPath(repository).c_str());

@@ -10,15 +10,15 @@
 namespace vclink::git
 {
 
-/// A file in the repository's folder that stands while libgit2 merges: `vclink-merge`, with the ids
-/// of HEAD and of the commit that is merged. If the process is killed, it stays, and tells the next
-/// commit that not all of the other side's work may have been written.
+/// A file in the repository's folder that exists while libgit2 merges: `vclink-merge`, with the ids
+/// of HEAD and of the merged commit. If the process is killed, the file stays, and shows the next
+/// commit that some of the other side's work may be missing.
 class MergeMarker
 {
   public:
-    /// To be made while the index is locked and no merge is under way: what is left of an earlier
-    /// merge goes.
-    /// @throws LibGit2Exception if the file can't be written
+    /// Creates the marker and removes that of an earlier merge. The index must be locked, and no
+    /// merge under way.
+    /// @throws LibGit2Exception if the file cannot be written
     [[nodiscard]] MergeMarker(git_repository *repository, const MergeSides &sides);
     MergeMarker(const MergeMarker &) = delete;
     MergeMarker &operator=(const MergeMarker &) = delete;
@@ -28,13 +28,12 @@ class MergeMarker
     std::string path_;
 };
 
-/// Whether a merge of `theirs` has been cut short in this repository, wherever HEAD was then: what
-/// is left of the merge outlives a switch of the branch. A marker that was itself cut short counts.
-/// @throws LibGit2Exception if that can't be found out
+/// Returns true if a merge of `theirs` was interrupted in this repository, with any HEAD: the rest
+/// of a merge survives a switch of the branch. An incomplete marker counts.
+/// @throws LibGit2Exception if this cannot be found out
 [[nodiscard]] bool hasMergeMarker(git_repository *repository, const git_oid &theirs);
 
-/// Removes the marker of a merge that is over. To be called while the index is locked and no merge
-/// is under way.
+/// Removes the marker of a merge that has ended. The index must be locked, and no merge under way.
 void removeMergeMarker(git_repository *repository) noexcept;
 
 } // namespace vclink::git

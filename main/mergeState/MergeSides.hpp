@@ -6,7 +6,7 @@
 namespace vclink::git
 {
 
-/// The two commits of a merge: HEAD's when it began, and the one that is merged into it.
+/// The two commits of a merge: that of HEAD when it began, and the one merged into it.
 struct MergeSides
 {
     git_oid ours;

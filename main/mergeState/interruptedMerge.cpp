@@ -33,16 +33,17 @@ namespace vclink::git
 namespace
 {
 
-/// Stages whatever stands where the merge may have written, so that new files are told from
-/// untracked ones, keeps it in the stash if it is anything, and puts back what HEAD has. Everything
-/// else stays. Folders, in the places of files that are not written yet, would stop the staging.
+/// Stages every file in a place where the merge may have written, which distinguishes new files
+/// from untracked ones. Keeps them in the stash if there are any, and restores what HEAD has.
+/// Everything else stays. Leaves out folders in the places of files that are not written yet,
+/// because they would stop the staging.
 constexpr const char *wayOut =
     "To begin again, run in the root of the working copy: git diff-tree -r -z --name-only HEAD "
     "MERGE_HEAD | xargs -0 sh -c 'for f; do [ -d \"$f\" ] && [ ! -L \"$f\" ] || "
     "printf \"%s\\0\" \"$f\"; done' sh | git update-index -z --add --remove --replace --stdin; "
     "git stash create | xargs -r git stash store; git merge --abort";
 
-/// @throws LibGit2Exception if that can't be looked at
+/// @throws LibGit2Exception if the path cannot be examined
 bool exists(const std::string &path)
 {
     struct stat status = {};
@@ -54,7 +55,8 @@ bool exists(const std::string &path)
     return isThere;
 }
 
-/// What libgit2 writes for every merge, and git only where asked for a merge commit.
+/// Returns true for the content that libgit2 writes for every merge, and git only for a requested
+/// merge commit.
 bool isModeOfLibGit2(const std::string &path)
 {
     const std::string expected = "no-ff";
@@ -76,7 +78,7 @@ OwnedHandle<git_tree> treeOf(const git_commit *commit)
     return acquire<git_tree>(git_commit_tree, commit).value();
 }
 
-/// The tree that both sides began with; null if they have nothing in common.
+/// Returns the tree with which both sides began, null if they have nothing in common.
 OwnedHandle<git_tree> findBase(git_repository *repository, const git_commit *ours,
                                const git_commit *theirs)
 {
@@ -91,7 +93,7 @@ OwnedHandle<git_tree> findBase(git_repository *repository, const git_commit *our
     return treeOf(acquire<git_commit>(git_commit_lookup, repository, &id).value().get());
 }
 
-/// A file of a tree or an index; the mode is 0 if it is not there.
+/// A file of a tree or an index. The mode is 0 if it does not exist.
 struct File
 {
     git_oid id = {};
@@ -123,7 +125,7 @@ File findInIndex(git_index *index, const char *path)
     return entry == nullptr ? File{} : File{entry->id, entry->mode};
 }
 
-/// Looks at what theirs has changed for something that ours has not touched.
+/// Searches the changes of theirs for one that ours has not touched.
 struct Search
 {
     const git_tree *ours;
@@ -132,7 +134,7 @@ struct Search
     bool isTaken = false;
 };
 
-/// Keeps no delta, and ends the comparison once there is nothing more to learn.
+/// Keeps no delta, and ends the comparison when the answer is known.
 int lookAt(const git_diff * /*diff*/, const git_diff_delta *delta, const char * /*pathspec*/,
            void *payload) noexcept
 {
@@ -156,7 +158,7 @@ int lookAt(const git_diff * /*diff*/, const git_diff_delta *delta, const char * 
     }
 }
 
-/// Whether only theirs has changed some files, and the index has none of it.
+/// Returns true if only theirs has changed some files, and the index has none of these changes.
 bool isNothingTaken(git_repository *repository, const git_commit *ours, const git_commit *theirs)
 {
     const OwnedHandle<git_tree> base = findBase(repository, ours, theirs);

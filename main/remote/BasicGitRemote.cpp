@@ -44,7 +44,7 @@ GitRemoteHead copyHead(const git_remote_head &head)
             copyText(head.symref_target)};
 }
 
-/// The list belongs to the remote, and ends with it.
+/// The list belongs to the remote, and is destroyed with it.
 std::vector<GitRemoteHead> copyHeads(const git_remote_head *const *heads, std::size_t count)
 {
     std::vector<GitRemoteHead> copies;
@@ -59,7 +59,7 @@ std::vector<GitRemoteHead> listHeads(git_remote *remote)
     const git_remote_head **heads = nullptr;
     std::size_t count = 0;
     const GitResult<void> listed = call(git_remote_ls, &heads, &count, remote);
-    // Asked of a success too, which is meant: every listing leaves a record in the log.
+    // Intentionally also after a success: every listing writes a record to the log.
     GitErrorPolicy::throwIfError(listed.has_error() ? listed.error() : GitError());
     return copyHeads(heads, count);
 }

@@ -6,21 +6,21 @@
 namespace vclink::git
 {
 
-/// Keeps the calling thread from the signal of a broken connection, which libgit2's sockets do not
-/// suppress and which ends a process that has not provided for it: a write to a connection that the
-/// other side has reset fails as any other write does then. What the process does about the signal
-/// is left to the host. Blocks nest.
+/// Blocks SIGPIPE, the signal of a broken connection, for the calling thread. libgit2's sockets do
+/// not suppress it, and by default it ends the process. With the block, a write to a connection
+/// that the other side has reset fails like any other write. Does not change how the process
+/// handles the signal. Blocks nest.
 ///
-/// Lives on the stack, around all use of a remote and the release of its handle. A child that is
-/// started meanwhile begins with the signal blocked.
+/// Lives on the stack, around every use of a remote and the release of its handle. A child process
+/// that is started in between begins with the signal blocked.
 class SigpipeBlock
 {
   public:
     [[nodiscard]] SigpipeBlock() noexcept;
     SigpipeBlock(const SigpipeBlock &) = delete;
     SigpipeBlock &operator=(const SigpipeBlock &) = delete;
-    /// Takes a signal away that came in between, one that was pending before staying, and gives the
-    /// thread its mask back. errno stays as it is.
+    /// Removes a signal that came in between, but not one that was pending before. Restores the
+    /// thread's mask, and keeps errno.
     ~SigpipeBlock();
 
   private:
