@@ -21,8 +21,8 @@ class VCLINK_HOST_EXPORT BaseMsgID
 {
   public:
     BaseMsgID(std::vector<MsgArgument> arguments, std::string catalogue, std::string key);
-    /// The same, inline: a literal's length is known where it stands, and a message is made for
-    /// every file of a checkout.
+    /// The same, inline: the compiler knows the length of a literal, and a checkout makes a message
+    /// for every file.
     BaseMsgID(std::vector<MsgArgument> arguments, const char *catalogue, const char *key)
         : arguments_(std::move(arguments)), catalogue_(catalogue), key_(key)
     {

@@ -15,12 +15,13 @@ namespace resource_core
 class VCLINK_HOST_EXPORT GenericMsgIDHolder
 {
   public:
-    /// Raised by reading an empty holder.
+    /// Thrown if an empty holder is read.
     class VCLINK_HOST_EXPORT EmptyGenericMsgIDHolder : public std::exception
     {
       public:
         ~EmptyGenericMsgIDHolder() override;
-        /// "GenericMsgIDHolder object is empty!\n"
+        /// Returns "GenericMsgIDHolder object is empty!
+        /// ".
         const char *what() const noexcept override;
     };
 
@@ -32,8 +33,8 @@ class VCLINK_HOST_EXPORT GenericMsgIDHolder
     GenericMsgIDHolder &operator=(GenericMsgIDHolder &&other) noexcept;
     ~GenericMsgIDHolder();
 
-    /// The held identifier, which lives as long as the holder keeps it.
-    /// @throws EmptyGenericMsgIDHolder when there is none, as a copy that Boost.Exception can clone
+    /// Returns the identifier, which lives as long as the holder keeps it.
+    /// @throws EmptyGenericMsgIDHolder if there is none, as a copy that Boost.Exception can clone
     const BaseMsgID &get() const;
 
   private:

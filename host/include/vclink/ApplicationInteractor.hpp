@@ -8,8 +8,8 @@
 namespace vclink
 {
 
-/// A back end's link to the application for one interaction. The order of the operations is
-/// binding.
+/// The connection of a back end to the application for one interaction. The order of the operations
+/// is binding.
 class VCLINK_HOST_EXPORT ApplicationInteractor
 {
   public:
@@ -18,9 +18,9 @@ class VCLINK_HOST_EXPORT ApplicationInteractor
     ApplicationInteractor &operator=(const ApplicationInteractor &) = delete;
     virtual ~ApplicationInteractor();
 
-    /// The source of cancellation, valid as long as the interactor.
+    /// Returns the source of cancellation, valid as long as the interactor.
     virtual Terminator &getTerminator() = 0;
-    /// The sink of progress, valid as long as the interactor; null for no progress.
+    /// Returns the receiver of progress, valid as long as the interactor, or null for no progress.
     virtual ProgressReporter *getProgressReporter() = 0;
 };
 

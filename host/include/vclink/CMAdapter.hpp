@@ -11,8 +11,8 @@
 namespace vclink
 {
 
-/// What the host asks of a source-control back end for one working copy. The order of the
-/// operations is binding. Failure is an exception.
+/// The operations of a source-control back end on one working copy. The order of the operations is
+/// binding. A failure is an exception.
 class VCLINK_HOST_EXPORT CMAdapter
 {
   public:

@@ -13,7 +13,7 @@
 namespace vclink
 {
 
-/// A back end's entry. The order of the operations is binding.
+/// The entry to a back end. The order of the operations is binding.
 class VCLINK_HOST_EXPORT CMAdapterFactory
 {
   public:

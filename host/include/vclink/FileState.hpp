@@ -6,7 +6,7 @@
 namespace vclink
 {
 
-/// The state of one file. A plain value, made from the number.
+/// The state of one file. A plain value, constructed from the number.
 class FileState
 {
   public:

@@ -9,7 +9,7 @@
 namespace vclink
 {
 
-/// States by path; its order is the order of file reports.
+/// States by path, in the order of file reports.
 using FileStateMap = std::map<upath, FileState>;
 
 } // namespace vclink

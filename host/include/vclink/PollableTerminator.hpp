@@ -9,18 +9,18 @@
 namespace vclink
 {
 
-/// Remembers a request for cancellation until it is polled. Each object has a memory of its own. A
-/// request made on another thread is seen by the next poll.
+/// Remembers a cancellation request until it is polled. Each object remembers it separately. The
+/// next poll sees a request of another thread.
 class VCLINK_HOST_EXPORT PollableTerminator
 {
   public:
-    /// Attaches to the source. An object may outlive its source, and is not told of anything then.
+    /// Attaches to the source. An object can outlive its source, and then receives nothing.
     explicit PollableTerminator(Terminator &source);
     PollableTerminator(const PollableTerminator &) = delete;
     PollableTerminator &operator=(const PollableTerminator &) = delete;
     ~PollableTerminator();
 
-    /// Whether cancellation was asked for since the last poll; clears that state.
+    /// Returns true if cancellation was requested since the last poll, and clears the request.
     bool checkAndResetCancelledState() noexcept;
 
   private:

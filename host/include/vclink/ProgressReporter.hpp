@@ -16,7 +16,7 @@ class VCLINK_HOST_EXPORT ProgressReporter
     ProgressReporter &operator=(const ProgressReporter &) = delete;
     virtual ~ProgressReporter();
 
-    /// @param fraction how much is done, 0 to 1
+    /// @param fraction the completed part, 0 to 1
     virtual void setProgress(double fraction) = 0;
     virtual void setProgressMessage(const ustring &message) = 0;
 };

@@ -8,8 +8,8 @@
 namespace vclink
 {
 
-/// A source of cancellation, opaque to a back end, which only attaches a PollableTerminator to it.
-/// The host asks with vclink_host::requestCancellation.
+/// A source of cancellation. It is opaque to a back end, which only attaches a PollableTerminator
+/// to it. The host requests a cancellation with vclink_host::requestCancellation.
 class VCLINK_HOST_EXPORT Terminator
 {
   public:
@@ -18,7 +18,7 @@ class VCLINK_HOST_EXPORT Terminator
     Terminator &operator=(const Terminator &) = delete;
     ~Terminator();
 
-    /// Opaque; the signal that carries a request to the attached pollers.
+    /// Opaque: the signal that sends a request to the attached pollers.
     struct Impl;
     Impl &impl() noexcept;
 

@@ -8,7 +8,7 @@
 namespace vclink
 {
 
-/// Makes working copies of repositories.
+/// Creates working copies of repositories.
 class VCLINK_HOST_EXPORT WorkingCopyGenerator
 {
   public:
@@ -17,8 +17,8 @@ class VCLINK_HOST_EXPORT WorkingCopyGenerator
     WorkingCopyGenerator &operator=(const WorkingCopyGenerator &) = delete;
     virtual ~WorkingCopyGenerator();
 
-    /// @param repositorySpecifier names the repository in the back end's own terms
-    /// @param sandboxRoot the folder of the working copy to be made
+    /// @param repositorySpecifier names the repository in the form that the back end defines
+    /// @param sandboxRoot the folder of the new working copy
     virtual void generate(const ustring &repositorySpecifier, const upath &sandboxRoot) = 0;
 };
 

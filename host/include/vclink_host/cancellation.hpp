@@ -7,8 +7,8 @@
 namespace vclink_host
 {
 
-/// Asks every poller attached to `source` to cancel. May be called from any thread, but not from a
-/// signal handler.
+/// Sends a cancellation request to every poller attached to `source`. Can be called from any
+/// thread, but not from a signal handler.
 VCLINK_HOST_EXPORT void requestCancellation(vclink::Terminator &source);
 
 } // namespace vclink_host

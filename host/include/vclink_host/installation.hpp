@@ -7,9 +7,8 @@
 namespace vclink_host
 {
 
-/// Sets what fl::filesystem::get_install_path() gives from now on. At the start it is the folder
-/// that this library was installed under, found from where the library lies. May be called from
-/// any thread.
+/// Sets the result of fl::filesystem::get_install_path(). By default it is the folder in which this
+/// library is installed, derived from the library's own path. Can be called from any thread.
 VCLINK_HOST_EXPORT void setInstallPath(const ustring &folder);
 
 } // namespace vclink_host

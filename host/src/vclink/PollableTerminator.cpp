@@ -29,7 +29,8 @@ Terminator::Impl &Terminator::impl() noexcept
 
 struct PollableTerminator::Impl
 {
-    // Shared with the slot: a request on another thread may still run it while this object ends.
+    // Shared with the slot: a request on another thread can still run it while this object is
+    // destroyed.
     std::shared_ptr<std::atomic<bool>> isRequested = std::make_shared<std::atomic<bool>>(false);
     boost::signals2::scoped_connection connection;
 };

@@ -4,7 +4,7 @@
 namespace vclink::util
 {
 
-// By value, as the host's interface has it, though only read here.
+// By value because of the host's interface, though only read here.
 ustring generateFileReport(std::vector<upath> files)
 {
     ustring report;

@@ -10,7 +10,8 @@
 namespace computils::exception
 {
 
-/// Records the stack of the thread that makes it. The frames are held inline, and copied with it.
+/// Records the stack of the thread that creates it. The frames are inline, and are copied with the
+/// object.
 class VCLINK_HOST_EXPORT StackTraceRecordingException : public std::exception
 {
   public:
@@ -19,7 +20,7 @@ class VCLINK_HOST_EXPORT StackTraceRecordingException : public std::exception
     StackTraceRecordingException &operator=(const StackTraceRecordingException &) = default;
     ~StackTraceRecordingException() override;
 
-    /// A text of the recording code's own; empty unless a derived class sets it.
+    /// A text for the report; empty unless a derived class sets it.
     const ustring &getText() const noexcept;
     const foundation::core::diag::stacktrace_base &getStackTrace() const noexcept;
 

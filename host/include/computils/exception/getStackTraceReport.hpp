@@ -7,8 +7,8 @@
 namespace computils::exception
 {
 
-/// The stack as text, one line a frame: inside a handler of an exception that recorded its stack,
-/// the stack of that exception; elsewhere the caller's own.
+/// Returns a stack as text, one line for each frame: inside a handler of an exception that recorded
+/// its stack, the stack of that exception, otherwise the caller's stack.
 /// @throws std::bad_alloc
 VCLINK_HOST_EXPORT ustring getStackTraceReport();
 

@@ -14,9 +14,9 @@ namespace fl::filesystem
 {
 
 /// A stream that reads a file. The file is open from construction to destruction, with a descriptor
-/// that child processes do not inherit. A file that can't be opened leaves the stream in a failed
-/// state, as std::basic_ifstream does; nothing is raised but std::bad_alloc. A symbolic link can't
-/// be opened: nobody who puts one in the place of a temporary file chooses what is read or written.
+/// that child processes do not inherit. If a file cannot be opened, the stream is in a failed
+/// state, as with std::basic_ifstream. Throws only std::bad_alloc. Does not open symbolic links, so
+/// that a link in the place of a temporary file cannot redirect reads and writes.
 template <class Char, class Traits = std::char_traits<Char>>
 class VCLINK_HOST_EXPORT basic_ifstream : public std::basic_istream<Char, Traits>
 {
@@ -30,8 +30,8 @@ class VCLINK_HOST_EXPORT basic_ifstream : public std::basic_istream<Char, Traits
     std::unique_ptr<std::basic_streambuf<Char, Traits>> buffer_;
 };
 
-/// A stream that writes a file, which is created or emptied; with std::ios_base::in among the modes
-/// it is neither, and has to be there. Otherwise like basic_ifstream.
+/// A stream that writes a file. Creates or empties the file; with std::ios_base::in it does
+/// neither, and the file must exist. Otherwise like basic_ifstream.
 template <class Char, class Traits = std::char_traits<Char>>
 class VCLINK_HOST_EXPORT basic_ofstream : public std::basic_ostream<Char, Traits>
 {
@@ -39,7 +39,7 @@ class VCLINK_HOST_EXPORT basic_ofstream : public std::basic_ostream<Char, Traits
     explicit basic_ofstream(const ustring &name, std::ios_base::openmode mode = std::ios_base::out);
     ~basic_ofstream() override;
     bool is_open() const;
-    /// Flushes and closes; a failure of either sets the stream's failbit.
+    /// Flushes and closes the file. A failure sets the stream's failbit.
     void close();
 
   private:

@@ -21,14 +21,14 @@ template <class Narrow, class Wide> struct path_traits
     using wide_type = Wide;
 };
 
-/// Whether the path `left` sorts before `right`: element by element, an element by its code
-/// units, a path that is a leading part of another first. Allocates nothing.
+/// Returns true if the path `left` sorts before `right`. Compares element by element, each by its
+/// code units; a path sorts before its continuations. Allocates nothing.
 VCLINK_HOST_EXPORT bool less(const ustring &left, const ustring &right) noexcept;
 
 } // namespace detail
 
-/// A path: a text and whether the text is in native form. A plain value; the text is kept as given,
-/// without normalisation.
+/// A path: a text, and a flag for native form. A plain value. The text is unchanged, without
+/// normalisation.
 template <class Narrow, class Wide, class Traits> class basic_path
 {
   public:

@@ -9,13 +9,13 @@
 namespace fl::i18n
 {
 
-/// The texts behind message identifiers.
+/// Returns the texts of message identifiers.
 class VCLINK_HOST_EXPORT MessageCatalog
 {
   public:
-    /// The text of `message` in `locale`, its arguments filled in. The text is looked up and built
-    /// at each call. A catalogue or key that is not known gives the identifier's own words: the
-    /// catalogue, the key and the arguments. Raises std::bad_alloc only. Any thread.
+    /// Returns the text of `message` in `locale`, with its arguments. Looks up and builds the text
+    /// at each call. For an unknown catalogue or key, returns the catalogue, the key and the
+    /// arguments. Throws only std::bad_alloc. Any thread.
     static ustring get_message(const resource_core::BaseMsgID &message, const VkLocale &locale);
 };
 

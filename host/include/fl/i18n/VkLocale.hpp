@@ -8,18 +8,18 @@
 namespace fl::i18n
 {
 
-/// Names the language in which texts are produced: a POSIX locale name such as "de_DE.UTF-8" or
-/// "ja". "C", "POSIX", an empty name and a language without a catalogue all mean the texts' own
-/// English. Only language and country count; texts are always produced in UTF-8.
+/// Names the language of texts: a POSIX locale name such as "de_DE.UTF-8" or "ja". "C", "POSIX", an
+/// empty name and a language without a catalogue all mean English. Only language and country count;
+/// texts are always in UTF-8.
 class VCLINK_HOST_EXPORT VkLocale
 {
   public:
     VkLocale() = default;
     explicit VkLocale(std::string name);
 
-    /// The locale of the process at this moment; vclink_host/locale.hpp sets it. At the start it
-    /// is what "LC_ALL", "LC_MESSAGES" or "LANG" name, the first that is set and not empty.
-    /// May be called from any thread.
+    /// Returns the current locale of the process; vclink_host/locale.hpp sets it. By default it is
+    /// that of "LC_ALL", "LC_MESSAGES" or "LANG", the first that is set and not empty. May be
+    /// called from any thread.
     static VkLocale global();
 
     const std::string &name() const noexcept;

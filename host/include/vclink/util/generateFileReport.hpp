@@ -10,8 +10,8 @@
 namespace vclink::util
 {
 
-/// The files as text, for a message: one path a line, in the list's order, without a line feed at
-/// the end.
+/// Returns the files as text for a message: one path on each line, in the list's order, without a
+/// line feed at the end.
 VCLINK_HOST_EXPORT ustring generateFileReport(std::vector<upath> files);
 
 } // namespace vclink::util

@@ -14,7 +14,7 @@ namespace
 
 using foundation::core::diag::stacktrace_base;
 
-/// The stack that the exception being handled has recorded, if it has.
+/// Returns the stack that the exception in flight has recorded, if any.
 std::optional<stacktrace_base> getStackOfCurrentException()
 {
     const std::exception_ptr current = std::current_exception();
@@ -32,7 +32,7 @@ std::optional<stacktrace_base> getStackOfCurrentException()
     }
     catch (...)
     {
-        // Nothing is lost: the caller's handler still holds this exception.
+        // Nothing is lost: the caller's handler still has this exception.
         return std::nullopt;
     }
 }

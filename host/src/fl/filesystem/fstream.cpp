@@ -16,7 +16,7 @@ namespace
 
 constexpr mode_t modeOfNewFiles = 0666; // what the process's mask leaves of it
 
-/// Stands in a stream that has no file: nothing to read, no room to write.
+/// The buffer of a stream without a file: it has nothing to read and no space to write.
 template <class Char, class Traits>
 class ClosedBuffer final : public std::basic_streambuf<Char, Traits>
 {
@@ -25,7 +25,7 @@ class ClosedBuffer final : public std::basic_streambuf<Char, Traits>
 template <class Device, class Traits>
 using FileBuffer = boost::iostreams::stream_buffer<Device, Traits>;
 
-// Boost opens files without O_CLOEXEC, so the descriptor is made here and handed over.
+// Boost opens files without O_CLOEXEC, so the descriptor is opened here and passed to Boost.
 int openForReading(const ustring &name, std::ios_base::openmode mode)
 {
     const int descriptor = openNative(name, O_RDONLY | O_NOFOLLOW, 0);
@@ -44,7 +44,7 @@ int openForWriting(const ustring &name, std::ios_base::openmode mode)
     return openNative(name, O_WRONLY | O_NOFOLLOW | create, modeOfNewFiles);
 }
 
-/// A buffer over the descriptor, which it owns; one without a file when there is no descriptor.
+/// Returns a buffer that owns the descriptor, or one without a file if there is no descriptor.
 template <class Device, class Char, class Traits>
 std::unique_ptr<std::basic_streambuf<Char, Traits>> makeBuffer(int descriptor)
 {
@@ -64,8 +64,8 @@ FileBuffer<Device, Traits> *asFileBuffer(std::basic_streambuf<Char, Traits> *buf
     return dynamic_cast<FileBuffer<Device, Traits> *>(buffer);
 }
 
-/// Closes the file and leaves the stream without one, its state kept.
-/// @return whether all went well, which includes that there was a file
+/// Closes the file, and keeps the state of the stream.
+/// @return true if there was a file and everything succeeded
 template <class Device, class Stream, class Char, class Traits>
 bool closeFile(Stream &stream, std::unique_ptr<std::basic_streambuf<Char, Traits>> &buffer)
 {
@@ -74,7 +74,7 @@ bool closeFile(Stream &stream, std::unique_ptr<std::basic_streambuf<Char, Traits
     {
         return false;
     }
-    // close() of the buffer keeps quiet about what it could not write.
+    // close() of the buffer does not report what it could not write.
     bool done = file->pubsync() == 0;
     try
     {

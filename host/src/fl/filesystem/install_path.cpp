@@ -15,7 +15,7 @@ namespace fl::filesystem
 namespace
 {
 
-/// The folder that this library was installed under; empty when its own place can't be found out.
+/// Returns the folder in which this library is installed, empty if it cannot be found out.
 ustring findInstallation()
 {
     static const char anchor = 0;

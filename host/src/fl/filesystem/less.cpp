@@ -13,8 +13,8 @@ namespace
 
 constexpr char16_t slash = u'/';
 
-/// Where the texts first differ, at most the length of the shorter one. Eight bytes a step: this is
-/// most of what an insertion into a map of a repository's paths costs.
+/// Returns the first difference of the texts, at most the length of the shorter one. Compares eight
+/// bytes at a time, because this is most of the cost of an insertion into a map of paths.
 std::size_t findDifference(std::u16string_view left, std::u16string_view right) noexcept
 {
     constexpr std::size_t step = sizeof(std::uint64_t) / sizeof(char16_t);
@@ -43,13 +43,13 @@ bool endsElement(std::u16string_view path, std::size_t position) noexcept
     return position == path.size() || path[position] == slash;
 }
 
-/// Whether a name comes at the position or behind it.
+/// Returns true if a name begins at the position or after it.
 bool hasName(std::u16string_view path, std::size_t position) noexcept
 {
     return path.find_first_not_of(slash, position) != std::u16string_view::npos;
 }
 
-/// Takes the next name off the path; empty when there is none.
+/// Removes the next name from the path and returns it. Empty if there is none.
 std::u16string_view takeName(std::u16string_view &path) noexcept
 {
     path.remove_prefix(std::min(path.find_first_not_of(slash), path.size()));
@@ -64,7 +64,7 @@ bool lessByNames(std::u16string_view left, std::u16string_view right) noexcept
     {
         const std::u16string_view leftName = takeName(left);
         const std::u16string_view rightName = takeName(right);
-        // An empty name is the end of a path, and compares as less than any other.
+        // An empty name is the end of a path, and is less than any other.
         const int order = leftName.compare(rightName);
         if (order != 0 || leftName.empty())
         {
@@ -81,7 +81,7 @@ bool lessByElements(std::u16string_view left, std::u16string_view right) noexcep
     {
         return lessByNames(left, right);
     }
-    // The root is an element like others, "/", and a name never begins with a slash.
+    // The root "/" is an element like others, and a name never begins with a slash.
     return leftIsRooted ? !right.empty() && slash < right.front()
                         : left.empty() || left.front() < slash;
 }
@@ -101,11 +101,11 @@ bool less(const ustring &left, const ustring &right) noexcept
     }
     if (difference > 0 && leftPath[difference - 1] != slash)
     {
-        // The same name up to here. Where it ends in one path only, that path is less; where it
-        // ends in both, one of them has nothing left.
+        // The names are equal up to here. If the name ends in only one path, that path is less; if
+        // it ends in both, one of the paths has ended.
         return leftEnds != rightEnds ? leftEnds : hasName(rightPath, difference);
     }
-    // Behind a common root only names are left.
+    // After a common root only names are left.
     return difference == 0 ? lessByElements(leftPath, rightPath)
                            : lessByNames(leftPath.substr(difference), rightPath.substr(difference));
 }

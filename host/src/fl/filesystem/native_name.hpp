@@ -8,11 +8,11 @@
 namespace fl::filesystem
 {
 
-/// open(2) on a name of the host's, with O_CLOEXEC; tried again when a signal interrupts it.
-/// @return the descriptor, or -1 with errno set; a name that holds a NUL character does not exist
+/// Calls open(2) for a name of the host, with O_CLOEXEC. Tries again if a signal interrupts it.
+/// @return the descriptor, or -1 with errno set; a name with a NUL character does not exist
 int openNative(const ustring &name, int flags, mode_t mode);
 
-/// Closes a descriptor at its end, unless it was released before.
+/// Closes a descriptor at its end, unless it was released.
 class DescriptorOwner
 {
   public:

@@ -12,7 +12,7 @@ namespace fl::filesystem
 namespace
 {
 
-/// The name for the system's calls; empty, which names nothing, when no file can have this name.
+/// Returns the name for the system's calls, empty if no file can have this name.
 std::string toNativeName(const upath &path)
 {
     std::string name = fl::i18n::ustring_to_utf8(path.string());

@@ -10,13 +10,13 @@ namespace
 
 constexpr char16_t separator = u'/';
 
-/// Where the name that begins at `begin` ends.
+/// Returns the end of the name that begins at `begin`.
 std::size_t findEndOfName(const ustring &path, std::size_t begin)
 {
     return std::min(path.find(separator, begin), path.size());
 }
 
-/// The last element's place in the path; empty for a path without a name.
+/// Returns the position of the last element in the path, empty for a path without a name.
 struct NameRange
 {
     std::size_t begin;
@@ -34,7 +34,7 @@ NameRange findLastName(const ustring &path)
     return {before == ustring::npos ? 0 : before + 1, last + 1};
 }
 
-/// Where the extension of a name begins; its end when it has none.
+/// Returns the start of the extension of a name, or its end if it has none.
 std::size_t findExtension(const ustring &path, NameRange name)
 {
     const std::size_t dot = path.rfind(u'.', name.end - 1);

@@ -25,7 +25,7 @@ ustring getTemporaryFolder()
     return error ? ustring(u"/tmp") : fl::i18n::utf8_to_ustring(folder.string());
 }
 
-/// A word of 128 random bits.
+/// Returns a word of 128 random bits.
 ustring makeRandomWord()
 {
     boost::system::error_code error;
@@ -33,7 +33,7 @@ ustring makeRandomWord()
         boost::filesystem::unique_path("%%%%%%%%%%%%%%%%%%%%%%%%%%%%%%%%", error);
     if (error)
     {
-        // Without a source of randomness the name is at least fresh.
+        // Without a source of randomness the name is at least new.
         const auto now = std::chrono::steady_clock::now().time_since_epoch().count();
         return fl::i18n::utf8_to_ustring(std::to_string(now));
     }

@@ -28,8 +28,8 @@ VkLocale readEnvironment()
     return VkLocale();
 }
 
-/// Read for each text that is shown, and seldom set: so that readers need no lock, a locale that
-/// was global once is kept, and found again when it is set again.
+/// The global locale is read for each text, and seldom set. So that readers need no lock, a locale
+/// that was global once is kept, and is found when it is set again.
 class GlobalLocale
 {
   public:

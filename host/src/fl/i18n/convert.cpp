@@ -33,8 +33,8 @@ constexpr bool isLowSurrogate(char16_t unit) noexcept
     return (unit & 0xFC00) == 0xDC00;
 }
 
-/// A code point, or the escape that stands for a byte; the byte's value is `value` - escapeOffset.
-/// `length` is what it takes in the text that is read.
+/// A code point, or the escape of a byte, whose value is `value` - escapeOffset. `length` is its
+/// length in the source text.
 struct Decoded
 {
     code_point value;
@@ -102,12 +102,12 @@ template <class Unit> constexpr bool isAscii(Unit unit) noexcept
     return static_cast<std::make_unsigned_t<Unit>>(unit) < 0x80;
 }
 
-/// The bits that no unit of an ASCII text has, of as many units as go into a word.
+/// The bits that no unit of an ASCII text has, for all units in a word.
 template <class Unit>
 constexpr std::uint64_t notAscii = sizeof(Unit) == 1 ? 0x8080808080808080U : 0xFF80FF80FF80FF80U;
 
-/// Copies so many units; false, and nothing written, when one of them is not ASCII. The copies to
-/// and from arrays let the compiler take the units all at once: a plain `char` might alias
+/// Copies some units. Returns false, and writes nothing, if one of them is not ASCII. The copies to
+/// and from arrays allow the compiler to process all units at once: a plain `char` might alias
 /// anything.
 template <std::size_t count, class To, class From>
 inline bool copyAscii(const From *from, To *to) noexcept
@@ -134,9 +134,9 @@ inline bool copyAscii(const From *from, To *to) noexcept
     return true;
 }
 
-/// Copies by blocks up to one with a unit that is not ASCII. What is left at the end and fills no
-/// block goes with a last block, which covers some of the one before again.
-/// @return how many were copied
+/// Copies by blocks up to one with a unit that is not ASCII. The last block overlaps the one before
+/// it if the end does not fill a block.
+/// @return the number of copied units
 template <std::size_t count, class To, class From>
 std::size_t copyAsciiBlocks(const From *from, std::size_t size, To *to) noexcept
 {
@@ -155,7 +155,7 @@ std::size_t copyAsciiBlocks(const From *from, std::size_t size, To *to) noexcept
 
 /// Copies up to the first unit that is not ASCII. Nearly all texts are ASCII from end to end, and
 /// there are two for each file of a status.
-/// @return how many were copied
+/// @return the number of copied units
 template <class To, class From>
 std::size_t copyLeadingAscii(const From *begin, const From *end, To *out) noexcept
 {
@@ -199,7 +199,7 @@ template <class To, class From> void write(const From *begin, const From *end, T
 
 template <class To, class From> std::basic_string<To> convert(std::basic_string_view<From> text)
 {
-    // A path that is ASCII is made here, so that its string needs no filling before.
+    // Creates an ASCII path directly, so that its string is not filled first.
     constexpr std::size_t capacity = 256;
     const From *const begin = text.data();
     const From *const end = begin + text.size();

@@ -20,7 +20,7 @@ struct EnglishTextOfKey
     EnglishText text;
 };
 
-// The first one is asked for with every file of a checkout.
+// A checkout requests the first one for every file.
 constexpr EnglishTextOfKey texts[] = {
     VCLINK_TEXT("ProgressCallbackCheckoutMessage",
                 // TRANSLATORS: %1% is the path of one file.

@@ -7,15 +7,15 @@
 namespace fl::i18n
 {
 
-/// A text in both encodings, since most texts are shown as they are.
+/// A text in both encodings, because most texts are shown unchanged.
 struct EnglishText
 {
     const char *utf8;
     std::u16string_view utf16;
 };
 
-/// The English text of a key of the catalogue "shared_vclink:git", with placeholders as
-/// Boost.Format has them; null for a key that the catalogue does not have.
+/// Returns the English text of a key of the catalogue "shared_vclink:git", with placeholders of
+/// Boost.Format, or null for an unknown key.
 const EnglishText *findEnglishText(const std::string &key) noexcept;
 
 } // namespace fl::i18n

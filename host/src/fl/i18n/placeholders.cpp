@@ -21,7 +21,7 @@ bool isPlaceholder(std::u16string_view text)
     return text.size() >= 3 && text[1] >= u'1' && text[1] <= u'9' && text[2] == u'%';
 }
 
-// What a path has room in, which is what a text is filled with most often.
+// Enough space for a path, the most frequent argument of a text.
 constexpr std::size_t usualArgument = 64;
 
 } // namespace
@@ -42,8 +42,7 @@ void appendArgument(ustring &text, const MsgArgument &argument)
     }
 }
 
-// One pass over a text that is shown for every file of a checkout: boost::format takes ten times as
-// long.
+// One pass over a text that a checkout shows for every file: boost::format takes ten times as long.
 ustring fillPlaceholders(std::u16string_view text, const std::vector<MsgArgument> &arguments)
 {
     ustring filled;

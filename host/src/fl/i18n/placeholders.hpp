@@ -10,14 +10,14 @@
 namespace fl::i18n
 {
 
-/// Fills the placeholders of a text: "%1%" stands for the first argument, and so on up to "%9%",
-/// "%%" for a percent sign. Whatever a translator made of them, nothing is raised but
-/// std::bad_alloc: a placeholder without an argument becomes empty, an argument without a
-/// placeholder is left out, and a percent sign that means nothing stands for itself.
+/// Replaces the placeholders of a text: "%1%" by the first argument, and so on up to "%9%", and
+/// "%%" by a percent sign. Accepts errors of translators and throws only std::bad_alloc: a
+/// placeholder without an argument becomes empty, an argument without a placeholder is left out,
+/// and any other percent sign is unchanged.
 ustring fillPlaceholders(std::u16string_view text,
                          const std::vector<resource_core::MsgArgument> &arguments);
 
-/// A value as it stands in a text.
+/// Returns a value as text.
 void appendArgument(ustring &text, const resource_core::MsgArgument &argument);
 
 } // namespace fl::i18n

@@ -29,7 +29,7 @@ struct Language
     std::string country;
 };
 
-/// Letters and digits only: the words become parts of a file's name.
+/// Allows only letters and digits, because the words become parts of a file name.
 bool isPlainWord(const std::string &word)
 {
     return std::all_of(word.begin(), word.end(),
@@ -41,7 +41,7 @@ bool isPlainWord(const std::string &word)
                        });
 }
 
-/// "de_DE.UTF-8@euro" is "de" and "DE"; both are empty for a name of another form.
+/// Splits "de_DE.UTF-8@euro" into "de" and "DE". Both are empty for a name of another form.
 Language parseLocaleName(const std::string &name)
 {
     const std::string place = name.substr(0, name.find_first_of(".@"));
@@ -59,7 +59,7 @@ std::string getInstalledCatalogues()
     return ustring_to_utf8(folder);
 }
 
-/// Whether a locale has no translations by its name alone.
+/// Returns true if a locale has no translations because of its name.
 bool isUntranslated(const std::string &name)
 {
     const bool isC = name[0] == 'C' && (name.size() == 1 || name[1] == '.');
@@ -68,7 +68,8 @@ bool isUntranslated(const std::string &name)
 
 using Messages = boost::locale::message_format<char>;
 
-/// A locale object that owns the language's catalogue; the classic one when the file is broken.
+/// Returns a locale object that owns the language's catalogue, or the classic one if the file is
+/// broken.
 std::locale loadCatalogue(const std::string &folder, const Language &language)
 {
     boost::locale::gnu_gettext::messages_info info;
@@ -92,7 +93,7 @@ std::locale loadCatalogue(const std::string &folder, const Language &language)
     }
 }
 
-/// The catalogues that were asked for. None is read twice.
+/// The catalogues that were requested. None is read twice.
 class Catalogues
 {
   public:

@@ -8,9 +8,9 @@
 namespace fl::i18n
 {
 
-/// The translation of a message into the locale's language, UTF-8; null where there is none, also
-/// when the language's catalogue can't be read. Raises std::bad_alloc only. Any thread. What it
-/// gives stays as long as the process: catalogues are never given up.
+/// Returns the translation of a message into the locale's language, UTF-8, or null if there is none
+/// or the language's catalogue cannot be read. The text lives as long as the process, because
+/// catalogues are never released. Throws only std::bad_alloc. Any thread.
 const char *findTranslation(const VkLocale &locale, const std::string &key, const char *english);
 
 } // namespace fl::i18n

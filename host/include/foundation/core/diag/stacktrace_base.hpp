@@ -10,24 +10,25 @@
 namespace foundation::core::diag
 {
 
-/// The return addresses of a call stack, held inline. A plain value; copying it copies the frames.
+/// The return addresses of a call stack, inline. A plain value; a copy has the frames too.
 class VCLINK_HOST_EXPORT stacktrace_base
 {
   public:
-    /// The most frames that a trace holds; deeper ones are left out.
+    /// The largest number of frames; deeper ones are left out.
     static constexpr std::size_t capacity = 128;
 
     stacktrace_base() noexcept = default;
 
     /// Replaces the frames by the calling thread's stack, innermost first, without the frame of
-    /// this function and without `skip` more. Allocates nothing.
+    /// this function and `skip` more. Allocates nothing.
     void capture(unsigned long skip) noexcept;
 
     std::size_t size() const noexcept;
-    /// The address of a frame; `index` is below size().
+    /// Returns the address of a frame. `index` must be below size().
     const void *frame(std::size_t index) const noexcept;
 
-    /// One line a frame: its number, its function where the symbol is visible, its module.
+    /// Returns one line for each frame: its number, its function if the symbol is visible, its
+    /// module.
     /// @throws std::bad_alloc
     ustring to_text() const;
 

@@ -9,7 +9,7 @@
 namespace foundation::core::except
 {
 
-/// The exception class of one message identifier: a host catches a certain failure by naming its
+/// The exception class of one message identifier. A host catches a particular failure with the
 /// identifier's class as Tag.
 template <class Tag, class Base, class Enable = void>
 class __attribute__((visibility("default"))) Exception : public IMsgIDException, public Base
@@ -20,12 +20,12 @@ class __attribute__((visibility("default"))) Exception : public IMsgIDException,
     {
     }
 
-    /// A copy on the heap, which the caller owns.
+    /// Returns a copy on the heap. The caller owns it.
     const Exception *clone() const override
     {
         return new Exception(*this);
     }
-    /// Throws a copy of this class; what was nested in the original is not in the copy.
+    /// Throws a copy of this class. The copy has no nested exception of the original.
     void rethrow() const override
     {
         throw Exception(*this);

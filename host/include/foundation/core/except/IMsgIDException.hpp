@@ -19,10 +19,10 @@ class VCLINK_HOST_EXPORT IMsgIDException : public IUserException, public boost::
   public:
     ~IMsgIDException() noexcept override;
 
-    /// catalogue + ":" + key.
+    /// Returns catalogue + ":" + key.
     static std::string get_error_id(const resource_core::BaseMsgID &message);
 
-    /// The catalogue's text of GetBaseMsgIDObj() in fl::i18n::VkLocale::global().
+    /// Returns the catalogue's text of GetBaseMsgIDObj() in fl::i18n::VkLocale::global().
     ustring GetUnicodeMessageTxt() const override;
 };
 

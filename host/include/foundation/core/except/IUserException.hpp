@@ -11,23 +11,23 @@
 namespace foundation::core::except
 {
 
-/// An exception whose text may be shown to a user. The order of the virtual operations is binding.
+/// An exception whose text can be shown to a user. The order of the virtual operations is binding.
 class VCLINK_HOST_EXPORT IUserException : public IException
 {
   public:
     ~IUserException() noexcept override;
 
-    /// The text as it stands.
+    /// Returns the text unchanged.
     virtual ustring convert_str(const ustring &text) const;
-    /// UTF-8 text as UTF-16.
+    /// Returns UTF-8 text as UTF-16.
     virtual ustring convert_str(const std::string &text) const;
-    /// The text of the exception: convert_str of GetUnicodeMessageTxt().
+    /// Returns the text of the exception: convert_str of GetUnicodeMessageTxt().
     virtual ustring ToUstringImpl() const;
-    /// The identifier of the message as text.
+    /// Returns the identifier of the message as text.
     virtual std::string GetID() const = 0;
-    /// The message in the process's locale of this moment.
+    /// Returns the message in the current locale of the process.
     virtual ustring GetUnicodeMessageTxt() const = 0;
-    /// The identifier of the message, which lives as long as the exception.
+    /// Returns the identifier of the message, which lives as long as the exception.
     virtual const resource_core::BaseMsgID &GetBaseMsgIDObj() const = 0;
 };
 

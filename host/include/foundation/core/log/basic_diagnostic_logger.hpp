@@ -10,7 +10,7 @@
 namespace foundation::core::log
 {
 
-/// An opened record, to be given its text and pushed; or none, when no sink wants it. Move only.
+/// An open record, which needs a text and must be pushed; or none, if no sink wants it. Move only.
 template <class Char> class VCLINK_HOST_EXPORT diagnostic_record
 {
   public:
@@ -21,7 +21,7 @@ template <class Char> class VCLINK_HOST_EXPORT diagnostic_record
 
     explicit operator bool() const noexcept;
 
-    /// Opaque; only the logger's source file knows it.
+    /// Opaque: only the logger's source file defines it.
     struct Impl;
     explicit diagnostic_record(std::unique_ptr<Impl> impl) noexcept;
     Impl &impl() noexcept;
@@ -30,17 +30,17 @@ template <class Char> class VCLINK_HOST_EXPORT diagnostic_record
     std::unique_ptr<Impl> impl_;
 };
 
-/// A named source of diagnostic records on top of Boost.Log. Its records carry the attributes
+/// A named source of diagnostic records, based on Boost.Log. Its records have the attributes
 /// "Severity" (unsigned int, a single bit), "Channel" (std::string, the logger's name) and
-/// "Message" (std::string, UTF-8). It sets no output: where records go is decided by the sinks of
-/// Boost.Log's core.
+/// "Message" (std::string, UTF-8). It sets no output: the sinks of Boost.Log's core decide where
+/// records go.
 ///
-/// Holds a mask of enabled severities, none at the start save those that the host asked for under
-/// this name before (vclink_host/logging.hpp). May be used from several threads at once.
+/// Has a mask of enabled severities: by default none, except those that the host has enabled for
+/// this name before (vclink_host/logging.hpp). Can be used from several threads at once.
 template <class Char> class VCLINK_HOST_EXPORT basic_diagnostic_logger
 {
   public:
-    /// @param name the channel; the host reaches the logger by it
+    /// @param name the channel, by which the host finds the logger
     explicit basic_diagnostic_logger(const std::string &name);
     basic_diagnostic_logger(const basic_diagnostic_logger &) = delete;
     basic_diagnostic_logger &operator=(const basic_diagnostic_logger &) = delete;
@@ -48,7 +48,7 @@ template <class Char> class VCLINK_HOST_EXPORT basic_diagnostic_logger
 
     const std::string &name() const noexcept;
 
-    /// Whether any bit of `severity` is enabled: one load and one test.
+    /// Returns true if any bit of `severity` is enabled: one load and one test.
     bool is_enabled(unsigned severity) const noexcept
     {
         return (enabled_severities_.load(std::memory_order_relaxed) & severity) != 0;
@@ -56,16 +56,16 @@ template <class Char> class VCLINK_HOST_EXPORT basic_diagnostic_logger
     unsigned enabled_severities() const noexcept;
     void set_enabled_severities(unsigned mask) noexcept;
 
-    /// Whether Boost.Log's core takes records at all.
+    /// Returns true if Boost.Log's core accepts records.
     bool is_logging_enabled() const;
-    /// Opens a record with this severity; false when no sink wants it.
-    /// @throws what the sinks' filters raise
+    /// Opens a record with this severity. The record is false if no sink wants it.
+    /// @throws what the sinks' filters throw
     diagnostic_record<Char> open_record(unsigned severity);
-    /// Gives the record its text and hands it to the sinks.
-    /// @throws what the sinks raise
+    /// Sets the text of the record and passes it to the sinks.
+    /// @throws what the sinks throw
     void push_record(diagnostic_record<Char> record, const std::basic_string<Char> &text);
 
-    /// The calling thread's count of open scopes; starts at 0 on every thread.
+    /// Returns the calling thread's count of open scopes, which starts at 0 on every thread.
     int &scope_depth();
 
   private:

@@ -8,11 +8,11 @@
 namespace scl::core::memory
 {
 
-/// An owning pointer whose deleter is erased, so that its holder needs no definition of T.
+/// An owning pointer with a type-erased deleter, so that its holder needs no definition of T.
 template <class T> using unique_incomplete_ptr = std::unique_ptr<T, std::function<void(T *)>>;
 
-/// Makes an Actual, held as a T. Only the caller needs the definition of Actual.
-/// @throws std::bad_alloc, and what Actual's constructor raises; nothing is left then
+/// Creates an Actual and returns it as a T. Only the caller needs the definition of Actual.
+/// @throws std::bad_alloc, and what Actual's constructor throws; then nothing is left
 template <class T, class Actual, class... Args>
 unique_incomplete_ptr<T> make_unique_incomplete(Args &&...args)
 {

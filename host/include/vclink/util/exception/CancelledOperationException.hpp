@@ -17,7 +17,7 @@ class VCLINK_HOST_EXPORT CancelledOperationException
     CancelledOperationException &operator=(const CancelledOperationException &) = default;
     ~CancelledOperationException() override;
 
-    /// "The operation was cancelled."
+    /// Returns "The operation was cancelled."
     const char *what() const noexcept override;
 };
 

@@ -34,7 +34,7 @@ const char *IException::what() const noexcept
     }
     catch (...)
     {
-        // The failure that is being reported counts, not that its text can't be made.
+        // The reported failure matters, not the failure to produce its text.
     }
     try
     {

@@ -96,8 +96,8 @@ template <class Char> bool basic_diagnostic_logger<Char>::is_logging_enabled() c
 template <class Char>
 diagnostic_record<Char> basic_diagnostic_logger<Char>::open_record(unsigned severity)
 {
-    // The record holds its severity itself. Boost's severity loggers keep it with the thread, where
-    // a record that is written while this one's text is made would change it.
+    // The record has its own severity. Boost's severity loggers keep it for the thread: a record
+    // that is written while this one's text is made would change it.
     boost::log::attribute_set attributes = impl_->attributes;
     attributes["Severity"] = boost::log::attributes::constant<unsigned>(severity);
     boost::log::record record = boost::log::core::get()->open_record(attributes);

@@ -9,20 +9,20 @@
 namespace foundation::core::log
 {
 
-/// The masks that the host asked for by name, and the loggers that are alive. Any thread.
+/// The masks that the host has set by name, and the living loggers. Any thread.
 class LoggerRegistry
 {
   public:
-    /// The registry of the process. A logger takes it in its constructor, so that it outlives
-    /// every logger with static storage.
+    /// Returns the registry of the process. A logger calls it in its constructor, so that the
+    /// registry outlives every logger with static storage.
     static LoggerRegistry &instance();
 
-    /// Adds a logger and gives its mask what was asked for under its name.
+    /// Adds a logger, and sets its mask to the one of its name.
     void attach(const std::string &name, std::atomic<unsigned> &mask);
     void detach(std::atomic<unsigned> &mask) noexcept;
 
     void setMask(const std::string &name, unsigned mask);
-    /// The bits that are set for the loggers of this name, else what was asked for, else 0.
+    /// Returns the mask of the loggers of this name, otherwise the one that was set, otherwise 0.
     unsigned getMask(const std::string &name);
 
   private:
