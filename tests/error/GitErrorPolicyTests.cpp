@@ -9,6 +9,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include "error/EmptySlot.hpp"
 #include "error/HermeticLibGit2.hpp"
 #include "error/errorUtil/callbackException.hpp"
 #include "error/logging/severity.hpp"
@@ -43,14 +44,7 @@ struct FromCallback : std::runtime_error
 class ThrowIfError : public testing::Test
 {
   protected:
-    ThrowIfError()
-    {
-        pendingCallbackException() = nullptr;
-    }
-    ~ThrowIfError() override
-    {
-        pendingCallbackException() = nullptr;
-    }
+    const test::EmptySlot emptySlot;
     HermeticLibGit2 libgit2;
 };
 

@@ -12,6 +12,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include "error/EmptySlot.hpp"
 #include "fl/i18n/convert.hpp"
 #include "support/LogCapture.hpp"
 #include "support/diagnosticText.hpp"
@@ -40,14 +41,7 @@ struct Tracked
 class CallbackException : public testing::Test
 {
   protected:
-    CallbackException()
-    {
-        pendingCallbackException() = nullptr;
-    }
-    ~CallbackException() override
-    {
-        pendingCallbackException() = nullptr;
-    }
+    const test::EmptySlot emptySlot;
 };
 
 TEST_F(CallbackException, IsMovedIntoTheOneSlotOfTheThread)

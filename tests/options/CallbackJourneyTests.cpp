@@ -10,6 +10,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include "error/EmptySlot.hpp"
 #include "error/errorUtil/GitResult.hpp"
 #include "options/Callbacks.hpp"
 #include "options/CancellationPoller.hpp"
@@ -73,21 +74,13 @@ class CallbackJourney : public test::GitFixture
   protected:
     CallbackJourney()
     {
-        pendingCallbackException() = nullptr;
         test::GitRepository copy = makeRepository();
         for (const char *const name : {"one", "two", "three"})
-        {
             copy.write(name, "text");
-        }
         copy.commitAll("first");
         repository_ = acquire<git_repository>(git_repository_open, copy.path().c_str()).value();
-        copy.write("one", "changed");
-        copy.write("two", "changed");
-        copy.write("three", "changed");
-    }
-    ~CallbackJourney() override
-    {
-        pendingCallbackException() = nullptr;
+        for (const char *const name : {"one", "two", "three"})
+            copy.write(name, "changed");
     }
 
     GitResult<void> walk(Members &walker) const
@@ -134,65 +127,56 @@ class CallbackJourney : public test::GitFixture
     }
 
   private:
+    const test::EmptySlot emptySlot_;
     test::LibGit2Session session_{environment()};
     OwnedHandle<git_repository> repository_;
 };
 
-TEST_F(CallbackJourney, EndsWithTheExceptionItself)
+/// A member's body that throws.
+std::function<int()> throwing(const std::string &text)
 {
-    Members walker;
-    walker.body = []() -> int { throw FromCallback("from the walk"); };
-    const GitResult<void> result = walk(walker);
-    EXPECT_EQ(walker.calls, 1) << "the walk was not stopped";
-    EXPECT_EQ(result.error().getCode(), GIT_EUSER);
+    return [text]() -> int { throw FromCallback(text); };
+}
+
+/// The text of the exception from a callback with which a call ends.
+std::string endOf(const GitResult<void> &result)
+{
     try
     {
         result.value();
-        ADD_FAILURE() << "nothing was raised";
+        return "no exception";
     }
-    catch (const std::exception &exception)
+    catch (const FromCallback &exception)
     {
         EXPECT_EQ(typeid(exception), typeid(FromCallback));
-        EXPECT_STREQ(exception.what(), "from the walk");
-    }
-    EXPECT_EQ(pendingCallbackException(), nullptr);
-}
-
-TEST_F(CallbackJourney, CarriesAnExceptionOfAForeignType)
-{
-    Members walker;
-    walker.body = []() -> int { throw 42; };
-    try
-    {
-        walk(walker).value();
-        ADD_FAILURE() << "nothing was raised";
-    }
-    catch (int number)
-    {
-        EXPECT_EQ(number, 42);
+        EXPECT_EQ(pendingCallbackException(), nullptr);
+        return exception.what();
     }
 }
 
-TEST_F(CallbackJourney, OfASuccessRaisesNothing)
+TEST_F(CallbackJourney, EndsWithTheExceptionItselfAndRaisesNothingOfASuccess)
 {
     Members walker;
     EXPECT_NO_THROW(walk(walker).value());
     EXPECT_EQ(walker.calls, 3);
+    walker.body = throwing("from the walk");
+    const GitResult<void> result = walk(walker);
+    EXPECT_EQ(walker.calls, 4) << "the walk was not stopped";
+    EXPECT_EQ(result.error().getCode(), GIT_EUSER);
+    EXPECT_EQ(endOf(result), "from the walk");
 }
 
-/// Expects that a walk whose member answers with `code` ends with an ordinary failure of that code.
-void expectOrdinaryFailure(const GitResult<void> &result, int code)
+TEST_F(CallbackJourney, CarriesAnExceptionOfAForeignTypeAndAFailureOfLibGit2)
 {
-    EXPECT_EQ(pendingCallbackException(), nullptr);
-    try
+    Members walker;
+    walker.body = []() -> int { throw 42; };
+    EXPECT_THROW(walk(walker).value(), int);
+    walker.body = []
     {
-        result.value();
-        ADD_FAILURE() << "nothing was raised";
-    }
-    catch (const LibGit2Exception &exception)
-    {
-        EXPECT_EQ(exception.getError().getCode(), code);
-    }
+        acquire<git_repository>(git_repository_open, "/nowhere/at/all").value();
+        return 0;
+    };
+    EXPECT_EQ(failureOf([&] { walk(walker).value(); }).code, GIT_ENOTFOUND);
 }
 
 TEST_F(CallbackJourney, OfAMembersOwnCodeEndsWithAnOrdinaryFailure)
@@ -201,7 +185,8 @@ TEST_F(CallbackJourney, OfAMembersOwnCodeEndsWithAnOrdinaryFailure)
     {
         Members walker;
         walker.body = [code] { return code; };
-        expectOrdinaryFailure(walk(walker), code);
+        EXPECT_EQ(failureOf([&] { walk(walker).value(); }).code, code);
+        EXPECT_EQ(pendingCallbackException(), nullptr);
         EXPECT_EQ(walker.calls, 1);
     }
 }
@@ -217,81 +202,46 @@ TEST_F(CallbackJourney, TellsBothRecordsForACodeOfTheUserWithoutAnException)
                                             testing::MatchesRegex("Throwing error .* \\(-7\\)")));
 }
 
-TEST_F(CallbackJourney, CarriesAFailureOfLibGit2InsideTheCallback)
-{
-    Members walker;
-    walker.body = []
-    {
-        acquire<git_repository>(git_repository_open, "/nowhere/at/all").value();
-        return 0;
-    };
-    EXPECT_EQ(failureOf([&] { walk(walker).value(); }).code, GIT_ENOTFOUND);
-}
-
-TEST_F(CallbackJourney, GoesThroughAWalkInsideAWalk)
+TEST_F(CallbackJourney, GoesThroughAWalkInsideAWalkOrEndsInTheCallback)
 {
     Members inner;
-    inner.body = []() -> int { throw FromCallback("from the inner walk"); };
+    inner.body = throwing("from the inner walk");
     Members outer;
     outer.body = [this, &inner]
     {
         walk(inner).value();
         return 0;
     };
-    EXPECT_THROW(walk(outer).value(), FromCallback);
+    EXPECT_EQ(endOf(walk(outer)), "from the inner walk");
     EXPECT_EQ(outer.calls, 1);
     EXPECT_EQ(inner.calls, 1);
-    EXPECT_EQ(pendingCallbackException(), nullptr);
-}
-
-TEST_F(CallbackJourney, MayEndInsideTheCallback)
-{
-    Members inner;
-    inner.body = []() -> int { throw FromCallback("from the inner walk"); };
-    Members outer;
     outer.body = [this, &inner]
     {
-        EXPECT_THROW(walk(inner).value(), FromCallback);
+        EXPECT_EQ(endOf(walk(inner)), "from the inner walk");
         return 0;
     };
     EXPECT_NO_THROW(walk(outer).value());
-    EXPECT_EQ(outer.calls, 3);
+    EXPECT_EQ(outer.calls, 4);
 }
 
-TEST_F(CallbackJourney, WaitsForTheNextCodeOfTheUserWhenAFailureIsDropped)
+TEST_F(CallbackJourney, WaitsForTheNextCodeOfTheUserWhenAFailureIsDroppedUnlessAnotherComes)
 {
     Members walker;
-    walker.body = []() -> int { throw FromCallback("dropped"); };
-    static_cast<void>(walk(walker));
-    EXPECT_NE(pendingCallbackException(), nullptr);
-
-    Members other;
-    other.body = [] { return -7; };
-    EXPECT_THROW(walk(other).value(), FromCallback);
-    EXPECT_THROW(walk(other).value(), LibGit2Exception);
-}
-
-TEST_F(CallbackJourney, EndsWithTheLaterOfTwoExceptions)
-{
-    Members walker;
-    walker.body = []() -> int { throw FromCallback("first"); };
-    static_cast<void>(walk(walker));
-    walker.body = []() -> int { throw FromCallback("second"); };
-    try
+    for (const char *const text : {"dropped", "replaced", "later"})
     {
-        walk(walker).value();
+        walker.body = throwing(text);
+        static_cast<void>(walk(walker));
+        EXPECT_NE(pendingCallbackException(), nullptr);
     }
-    catch (const FromCallback &exception)
-    {
-        EXPECT_STREQ(exception.what(), "second");
-    }
-    EXPECT_EQ(pendingCallbackException(), nullptr);
+    walker.body = [] { return -7; };
+    EXPECT_EQ(endOf(walk(walker)), "later");
+    EXPECT_THROW(walk(walker).value(), LibGit2Exception);
 }
 
 TEST_F(CallbackJourney, WaitsWhenLibGit2AnswersWithAnotherCode)
 {
     Members observer;
-    observer.body = []() -> int { throw FromCallback("from the fetch"); };
+    observer.body = throwing("from the fetch");
     const GitResult<void> result = fetch(observer);
     ASSERT_EQ(observer.calls, 1);
     ASSERT_TRUE(result.has_error());
@@ -304,15 +254,15 @@ TEST_F(CallbackJourney, WaitsWhenLibGit2AnswersWithAnotherCode)
 TEST_F(CallbackJourney, StopsACheckout)
 {
     Members observer;
-    observer.body = []() -> int { throw FromCallback("from the checkout"); };
-    EXPECT_THROW(checkOut(observer, false).value(), FromCallback);
+    observer.body = throwing("from the checkout");
+    EXPECT_EQ(endOf(checkOut(observer, false)), "from the checkout");
     EXPECT_EQ(observer.calls, 1);
 }
 
 TEST_F(CallbackJourney, DoesNotBeginInACallbackWithoutAResult)
 {
     Members observer;
-    observer.body = []() -> int { throw FromCallback("from the progress"); };
+    observer.body = throwing("from the progress");
     EXPECT_NO_THROW(checkOut(observer, true).value());
     EXPECT_GE(observer.calls, 3);
     EXPECT_EQ(pendingCallbackException(), nullptr);
@@ -333,15 +283,7 @@ TEST_F(CallbackJourney, OfACancellationEndsWithItAndARetryRunsNormally)
         return 0;
     };
     interactor.cancel();
-    try
-    {
-        checkOut(observer, false).value();
-        ADD_FAILURE() << "nothing was raised";
-    }
-    catch (const std::exception &exception)
-    {
-        EXPECT_EQ(typeid(exception), typeid(CancelledOperationException));
-    }
+    EXPECT_THROW(checkOut(observer, false).value(), CancelledOperationException);
     EXPECT_EQ(observer.calls, 1);
     EXPECT_NO_THROW(checkOut(observer, false).value());
     EXPECT_GT(observer.calls, 2);

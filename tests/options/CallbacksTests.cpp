@@ -17,6 +17,7 @@
 #include <gtest/gtest.h>
 
 #include "error/CoreFilter.hpp"
+#include "error/EmptySlot.hpp"
 #include "support/LogCapture.hpp"
 #include "support/diagnosticText.hpp"
 #include "support/isRecord.hpp"
@@ -85,14 +86,7 @@ struct BoostOnly : virtual boost::exception
 class Callback : public testing::Test
 {
   protected:
-    Callback()
-    {
-        pendingCallbackException() = nullptr;
-    }
-    ~Callback() override
-    {
-        pendingCallbackException() = nullptr;
-    }
+    const test::EmptySlot emptySlot;
 
     /// Lets the target throw, and gives what the callback answers.
     template <class Exception> int answerThrowing(const Exception &exception)
@@ -112,104 +106,58 @@ TEST_F(Callback, CallsTheMemberWithItsArgumentsInOrder)
                 ElementsAre(std::make_pair("folder/file", 17u), std::make_pair("other", 99u)));
 }
 
-TEST_F(Callback, GivesTheMembersResultUnchanged)
+TEST_F(Callback, GivesTheMembersResultUnchangedAlsoThroughTheLambda)
 {
+    const auto lambda =
+        detail::makeCallbackImpl<&Target::answer>(std::tuple<const char *, unsigned, void *>());
     for (const int result : {0, 1, -1, -7, -30, 42, INT_MIN, INT_MAX})
     {
         target.body = [result] { return result; };
         EXPECT_EQ(answerCallback("path", 1, &target), result);
+        EXPECT_EQ(lambda("path", 1, &target), result);
         EXPECT_EQ(pendingCallbackException(), nullptr) << result;
     }
 }
 
-TEST_F(Callback, IsTheSameThroughTheLambda)
+TEST_F(Callback, ParksTheVeryObjectThatWasThrownInPlaceOfAnEarlierOneAndThroughALaterSuccess)
 {
-    target.body = [] { return 5; };
-    const auto lambda =
-        detail::makeCallbackImpl<&Target::answer>(std::tuple<const char *, unsigned, void *>());
-    EXPECT_EQ(lambda("path", 1, &target), 5);
-}
-
-TEST_F(Callback, ParksAnExceptionOfAnyTypeAndAnswersWithTheUsersCode)
-{
-    EXPECT_EQ(answerThrowing(std::runtime_error("failed")), -7);
-    EXPECT_THROW(std::rethrow_exception(pendingCallbackException()), std::runtime_error);
-    EXPECT_EQ(answerThrowing(CancelledOperationException()), -7);
-    EXPECT_THROW(std::rethrow_exception(pendingCallbackException()), CancelledOperationException);
-    EXPECT_EQ(answerThrowing(BoostOnly()), -7);
-    EXPECT_THROW(std::rethrow_exception(pendingCallbackException()), BoostOnly);
-    EXPECT_EQ(answerThrowing(42), -7);
-    EXPECT_THROW(std::rethrow_exception(pendingCallbackException()), int);
-}
-
-TEST_F(Callback, ParksTheVeryObjectThatWasThrown)
-{
-    const std::exception_ptr thrown = std::make_exception_ptr(std::runtime_error("failed"));
-    target.body = [&thrown]() -> int { std::rethrow_exception(thrown); };
-    answerCallback("path", 1, &target);
-    EXPECT_EQ(pendingCallbackException(), thrown);
-}
-
-TEST_F(Callback, ReplacesAnExceptionThatNobodyHasTaken)
-{
-    answerThrowing(1);
-    answerThrowing(2);
-    try
+    for (const std::exception_ptr &thrown :
+         {std::make_exception_ptr(std::runtime_error("failed")), std::make_exception_ptr(2)})
     {
-        std::rethrow_exception(pendingCallbackException());
-    }
-    catch (int number)
-    {
-        EXPECT_EQ(number, 2);
+        target.body = [&thrown]() -> int { std::rethrow_exception(thrown); };
+        answerCallback("path", 1, &target);
+        EXPECT_EQ(pendingCallbackException(), thrown);
+        target.body = [] { return 0; };
+        EXPECT_EQ(answerCallback("path", 1, &target), 0);
+        EXPECT_EQ(pendingCallbackException(), thrown);
     }
 }
 
-TEST_F(Callback, KeepsAParkedExceptionThroughALaterSuccess)
-{
-    answerThrowing(1);
-    target.body = [] { return 0; };
-    EXPECT_EQ(answerCallback("path", 1, &target), 0);
-    EXPECT_NE(pendingCallbackException(), nullptr);
-}
-
-TEST_F(Callback, WithoutAResultReportsAndStoresNothing)
-{
-    target.body = []() -> int { throw std::runtime_error("failed"); };
-    const LogCapture log(SeverityException | SeverityStackTrace);
-    noticeCallback("path", 1, &target);
-    EXPECT_EQ(pendingCallbackException(), nullptr);
-    const auto records = log.records();
-    ASSERT_EQ(records.size(), 2u);
-    EXPECT_EQ(records[0].severity, 0x10u);
-    EXPECT_THAT(records[0].message, HasSubstr("failed"));
-    EXPECT_EQ(records[1].severity, 0x200u);
-}
-
-TEST_F(Callback, WithoutAResultLeavesAParkedExceptionAlone)
-{
-    answerThrowing(1);
-    const std::exception_ptr parked = pendingCallbackException();
-    target.body = []() -> int { throw 2; };
-    noticeCallback("path", 1, &target);
-    EXPECT_EQ(pendingCallbackException(), parked);
-}
-
-/// Lets a callback throw, and expects the text of the exception and then a stack.
+/// Lets both callbacks throw, and expects the text of the exception and then a stack of each. Only
+/// the one with a result parks it, with the user's code.
 template <class Exception> void expectReports(const Exception &exception)
 {
-    const std::string expected = "Exception caught: " + diagnosticTextOf(exception);
+    const auto isReport =
+        ElementsAre(isRecord(0x10, "Exception caught: " + diagnosticTextOf(exception)),
+                    testing::AllOf(testing::Field(&test::LogRecord::severity, 0x200u),
+                                   testing::Field(&test::LogRecord::message, StartsWith("0# "))));
     Target target;
     target.body = [&exception]() -> int { throw exception; };
-    const LogCapture log(SeverityException | SeverityStackTrace);
-    answerCallback("path", 1, &target);
-    const auto records = log.records();
-    ASSERT_EQ(records.size(), 2u);
-    EXPECT_THAT(records[0], isRecord(0x10, expected));
-    EXPECT_EQ(records[1].severity, 0x200u);
-    EXPECT_THAT(records[1].message, StartsWith("0# "));
+    LogCapture log(SeverityException | SeverityStackTrace);
+    EXPECT_EQ(answerCallback("path", 1, &target), -7);
+    EXPECT_THAT(log.records(), isReport);
+    const std::exception_ptr parked = pendingCallbackException();
+    EXPECT_THROW(std::rethrow_exception(parked), Exception);
+    log.clear();
+    noticeCallback("path", 1, &target);
+    EXPECT_THAT(log.records(), isReport);
+    EXPECT_EQ(pendingCallbackException(), parked);
+    pendingCallbackException() = nullptr;
+    noticeCallback("path", 1, &target);
+    EXPECT_EQ(pendingCallbackException(), nullptr);
 }
 
-TEST_F(Callback, ReportsTheExceptionAndThenTheStack)
+TEST_F(Callback, ReportsAnExceptionOfAnyTypeAndThenTheStackAndParksItIfItHasAResult)
 {
     expectReports(std::runtime_error("failed"));
     expectReports(CancelledOperationException());
@@ -252,68 +200,34 @@ constexpr const char *memberInSignature = "std::tuple<const char *, unsigned int
 constexpr const char *memberInSignature = "Target::answer";
 #endif
 
-TEST_F(Callback, TracesUnderASignatureThatNamesTheMember)
-{
-    const std::string text = tracedAs([this] { answerCallback("path", 1, &target); });
-    EXPECT_THAT(text, HasSubstr("vclink::git::detail::makeCallbackImpl"));
-    EXPECT_THAT(text, HasSubstr(memberInSignature));
-}
-
-TEST_F(Callback, TracesEachInstanceUnderItsOwnSignature)
+TEST_F(Callback, TracesEachInstanceUnderASignatureThatNamesTheMemberAlsoWhenItThrows)
 {
     const auto other = makeCallback<&Target::otherAnswer, int (*)(unsigned, void *)>();
     const std::string one = tracedAs([this] { answerCallback("path", 1, &target); });
     const std::string two = tracedAs([this] { noticeCallback("path", 1, &target); });
     const std::string three = tracedAs([this, other] { other(1, &target); });
+    EXPECT_THAT(one, HasSubstr("vclink::git::detail::makeCallbackImpl"));
+    EXPECT_THAT(one, HasSubstr(memberInSignature));
     EXPECT_NE(one, two);
     EXPECT_NE(one, three);
     EXPECT_NE(two, three);
-}
-
-TEST_F(Callback, TracesTheSameWhenTheMemberThrows)
-{
-    const std::string returning = tracedAs([this] { answerCallback("path", 1, &target); });
-    EXPECT_EQ(tracedAs([this] { answerThrowing(1); }), returning);
+    EXPECT_EQ(tracedAs([this] { answerThrowing(1); }), one);
     EXPECT_EQ(logger().scope_depth(), 0);
 }
 
-TEST_F(Callback, ReportsInsideItsScope)
+TEST_F(Callback, CallsTheMemberAndReportsInsideItsScope)
 {
-    const LogCapture log(SeverityScopeEntry | SeverityScopeExit | SeverityException |
-                         SeverityStackTrace);
-    answerThrowing(std::runtime_error("failed"));
+    LogCapture log;
     std::vector<unsigned> severities;
-    for (const auto &record : log.records())
-    {
-        severities.push_back(record.severity);
-    }
-    EXPECT_THAT(severities, ElementsAre(0x20u, 0x10u, 0x200u, 0x40u));
-}
-
-TEST_F(Callback, CallsTheMemberInsideItsScope)
-{
-    const LogCapture log(SeverityScopeEntry);
-    target.body = []
+    log.onRecord([&](const test::LogRecord &record) { severities.push_back(record.severity); });
+    target.body = []() -> int
     {
         EXPECT_EQ(logger().scope_depth(), 1);
-        return 0;
+        throw std::runtime_error("failed");
     };
     answerCallback("path", 1, &target);
     EXPECT_EQ(logger().scope_depth(), 0);
-}
-
-/// A filter that lets records of one severity fail.
-CoreFilter failAt(unsigned severity)
-{
-    return CoreFilter(
-        [severity](unsigned asked)
-        {
-            if (asked == severity)
-            {
-                throw std::logic_error("the sink failed");
-            }
-            return true;
-        });
+    EXPECT_THAT(severities, ElementsAre(0x20u, 0x10u, 0x200u, 0x40u));
 }
 
 class CallbackDeathTest : public Callback
@@ -325,23 +239,25 @@ class CallbackDeathTest : public Callback
         const LogCapture log;
         EXPECT_DEATH(
             {
-                const CoreFilter filter = failAt(severity);
+                const CoreFilter filter(
+                    [severity](unsigned asked)
+                    {
+                        if (asked == severity)
+                            throw std::logic_error("the sink failed");
+                        return true;
+                    });
                 call();
             },
             "terminate called.*logic_error");
     }
 };
 
-TEST_F(CallbackDeathTest, EndsTheProcessWhenTheTraceOfItsEntryOrExitFails)
+TEST_F(CallbackDeathTest, EndsTheProcessWhenTheTraceOfItsEntryOrExitOrTheReportFails)
 {
-    for (const unsigned severity : {SeverityScopeEntry, SeverityScopeExit})
-        expectDeath(severity, [this] { answerCallback("path", 1, &target); });
-}
-
-TEST_F(CallbackDeathTest, EndsTheProcessWhenTheReportFails)
-{
-    expectDeath(SeverityException, [this] { answerThrowing(1); });
     target.body = []() -> int { throw 1; };
+    const auto answer = [this] { answerCallback("path", 1, &target); };
+    for (const unsigned severity : {SeverityScopeEntry, SeverityScopeExit, SeverityException})
+        expectDeath(severity, answer);
     expectDeath(SeverityStackTrace, [this] { noticeCallback("path", 1, &target); });
 }
 

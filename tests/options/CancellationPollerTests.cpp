@@ -20,17 +20,12 @@ using vclink::util::exception::CancelledOperationException;
 static_assert(sizeof(CancellationPoller) ==
               sizeof(ApplicationInteractor *) + sizeof(PollableTerminator));
 
-TEST(CancellationPoller, ReturnsWhenNobodyAsked)
+TEST(CancellationPoller, RaisesTheHostsExceptionWithItsStackOncePerRequest)
 {
     TestInteractor interactor;
     CancellationPoller poller(interactor);
     EXPECT_NO_THROW(poller.throwIfCancelled());
-}
-
-TEST(CancellationPoller, RaisesTheHostsExceptionWithItsStack)
-{
-    TestInteractor interactor;
-    CancellationPoller poller(interactor);
+    interactor.cancel();
     interactor.cancel();
     try
     {
@@ -42,47 +37,26 @@ TEST(CancellationPoller, RaisesTheHostsExceptionWithItsStack)
         EXPECT_EQ(typeid(exception), typeid(CancelledOperationException));
         EXPECT_GT(exception.getStackTrace().size(), 0u);
     }
-}
-
-TEST(CancellationPoller, ForgetsARequestThatItHasSeen)
-{
-    TestInteractor interactor;
-    CancellationPoller poller(interactor);
-    interactor.cancel();
-    interactor.cancel();
-    EXPECT_THROW(poller.throwIfCancelled(), CancelledOperationException);
     EXPECT_NO_THROW(poller.throwIfCancelled());
     interactor.cancel();
     EXPECT_THROW(poller.throwIfCancelled(), CancelledOperationException);
 }
 
-TEST(CancellationPoller, IsConnectedFromItsMakingOn)
-{
-    TestInteractor interactor;
-    interactor.cancel();
-    CancellationPoller poller(interactor);
-    EXPECT_NO_THROW(poller.throwIfCancelled());
-}
-
-TEST(CancellationPoller, HasAMemoryOfItsOwn)
-{
-    TestInteractor interactor;
-    CancellationPoller one(interactor);
-    CancellationPoller two(interactor);
-    interactor.cancel();
-    EXPECT_THROW(one.throwIfCancelled(), CancelledOperationException);
-    EXPECT_NO_THROW(one.throwIfCancelled());
-    EXPECT_THROW(two.throwIfCancelled(), CancelledOperationException);
-    EXPECT_NO_THROW(two.throwIfCancelled());
-}
-
-TEST(CancellationPoller, ListensToItsOwnSourceOnly)
+TEST(CancellationPoller, ListensToItsOwnSourceFromItsMakingOnWithAMemoryOfItsOwn)
 {
     TestInteractor interactor;
     TestInteractor other;
-    CancellationPoller poller(interactor);
+    interactor.cancel();
+    CancellationPoller one(interactor);
+    CancellationPoller two(interactor);
     other.cancel();
-    EXPECT_NO_THROW(poller.throwIfCancelled());
+    EXPECT_NO_THROW(one.throwIfCancelled());
+    interactor.cancel();
+    for (CancellationPoller *const poller : {&one, &two})
+    {
+        EXPECT_THROW(poller->throwIfCancelled(), CancelledOperationException);
+        EXPECT_NO_THROW(poller->throwIfCancelled());
+    }
 }
 
 TEST(CancellationPoller, MayEndBeforeItsSource)

@@ -6,7 +6,6 @@
 #include <limits>
 #include <stdexcept>
 #include <string>
-#include <typeinfo>
 #include <vector>
 
 #include <gmock/gmock.h>
@@ -88,21 +87,17 @@ using CheckoutNotification = CheckoutCallbacksTest;
 using CheckoutProgress = CheckoutCallbacksTest;
 using CheckoutPerfData = CheckoutCallbacksTest;
 
-TEST_F(CheckoutNotification, VetoesNothingWhateverTheReason)
-{
-    for (const unsigned why : {0u, 1u, 2u, 4u, 8u, 16u, 0x8000u, 0xFFFFu})
-    {
-        EXPECT_EQ(notify(static_cast<git_checkout_notify_t>(why), "file"), 0) << why;
-    }
-}
-
-TEST_F(CheckoutNotification, DoesNotLookAtTheThreeFiles)
+TEST_F(CheckoutNotification, VetoesNothingWhateverTheReasonAndTheThreeFilesAndMovesNoProgress)
 {
     // No place that could be read.
     const auto *const nowhere = reinterpret_cast<const git_diff_file *>(std::uintptr_t{8});
-    EXPECT_EQ(
-        callbacks_.notifyProgress(GIT_CHECKOUT_NOTIFY_UPDATED, "file", nowhere, nowhere, nowhere),
-        0);
+    for (const unsigned why : {0u, 1u, 2u, 4u, 8u, 16u, 0x8000u, 0xFFFFu})
+        EXPECT_EQ(callbacks_.notifyProgress(static_cast<git_checkout_notify_t>(why), "file",
+                                            nowhere, nowhere, nowhere),
+                  0)
+            << why;
+    EXPECT_EQ(interactor_.asked, 0);
+    EXPECT_THAT(interactor_.progress.calls, IsEmpty());
 }
 
 TEST_F(CheckoutNotification, TellsReasonAndPathInOneRecord)
@@ -111,50 +106,24 @@ TEST_F(CheckoutNotification, TellsReasonAndPathInOneRecord)
     notify(GIT_CHECKOUT_NOTIFY_CONFLICT, "folder/file");
     notify(GIT_CHECKOUT_NOTIFY_IGNORED, "caf\xE9 (1)");
     notify(GIT_CHECKOUT_NOTIFY_ALL, "");
+    EXPECT_EQ(notify(GIT_CHECKOUT_NOTIFY_DIRTY, nullptr), 0);
     EXPECT_THAT(log.records(),
                 ElementsAre(isRecord(SeverityProgress, "Checkout Notify : 1 (folder/file)"),
                             isRecord(SeverityProgress, "Checkout Notify : 16 (caf\xE9 (1))"),
-                            isRecord(SeverityProgress, "Checkout Notify : 65535 ()")));
+                            isRecord(SeverityProgress, "Checkout Notify : 65535 ()"),
+                            isRecord(SeverityProgress, "Checkout Notify : 2 ()")));
 }
 
-TEST_F(CheckoutNotification, TakesANullPathForAnEmptyOne)
-{
-    const LogCapture log;
-    EXPECT_EQ(notify(GIT_CHECKOUT_NOTIFY_DIRTY, nullptr), 0);
-    EXPECT_THAT(log.messages(), ElementsAre("Checkout Notify : 2 ()"));
-}
-
-TEST_F(CheckoutNotification, PollsBeforeAllElse)
+TEST_F(CheckoutNotification, PollsBeforeAllElseAndForgetsARequestThatItHasSeen)
 {
     const LogCapture log;
     interactor_.cancel();
-    try
-    {
-        notify(GIT_CHECKOUT_NOTIFY_UPDATED, "file");
-        ADD_FAILURE() << "nothing was raised";
-    }
-    catch (const std::exception &exception)
-    {
-        EXPECT_EQ(typeid(exception), typeid(CancelledOperationException));
-    }
+    interactor_.cancel();
+    EXPECT_THROW(notify(GIT_CHECKOUT_NOTIFY_UPDATED, "file"), CancelledOperationException);
     EXPECT_THAT(log.records(), IsEmpty());
-}
-
-TEST_F(CheckoutNotification, ForgetsARequestThatItHasSeen)
-{
-    interactor_.cancel();
-    interactor_.cancel();
-    EXPECT_THROW(notifyOfNothing(), CancelledOperationException);
     EXPECT_EQ(notifyOfNothing(), 0);
     interactor_.cancel();
     EXPECT_THROW(notifyOfNothing(), CancelledOperationException);
-}
-
-TEST_F(CheckoutNotification, MovesNoProgress)
-{
-    notify(GIT_CHECKOUT_NOTIFY_UPDATED, "file");
-    EXPECT_EQ(interactor_.asked, 0);
-    EXPECT_THAT(interactor_.progress.calls, IsEmpty());
 }
 
 TEST_F(CheckoutProgress, TellsTheFractionAndThenTheFile)
@@ -162,44 +131,35 @@ TEST_F(CheckoutProgress, TellsTheFractionAndThenTheFile)
     EXPECT_THAT(callsOf("folder/file", 1, 4),
                 ElementsAre(0.25, message(u"Checking out folder/file")));
     EXPECT_THAT(callsOf("other", 4, 4), ElementsAre(1.0, message(u"Checking out other")));
-}
-
-TEST_F(CheckoutProgress, SetsZeroTwiceForAFirstStepWithAPath)
-{
+    // Zero twice for a first step with a path.
     EXPECT_THAT(callsOf("file", 0, 3), ElementsAre(0.0, 0.0, message(u"Checking out file")));
+    // What a path shares with placeholders.
+    EXPECT_THAT(callsOf("%1% 100%", 1, 1), ElementsAre(1.0, message(u"Checking out %1% 100%")));
+    // A path that is no UTF-8.
+    EXPECT_THAT(callsOf("caf\xE9", 1, 1), ElementsAre(1.0, message(test::asUtf16("Checking out ") +
+                                                                   test::asUtf16("caf\xE9"))));
+    EXPECT_EQ(interactor_.progress.messages.back().back(), char16_t{0xDCE9});
 }
 
-TEST_F(CheckoutProgress, SetsZeroOnceForAFirstStepWithoutAPath)
+TEST_F(CheckoutProgress, SetsZeroOnceForAFirstStepWithoutAPathOrATotalAndTellsNothingOfALaterOne)
 {
     EXPECT_THAT(callsOf(nullptr, 0, 3), ElementsAre(ProgressCall(0.0)));
     EXPECT_THAT(callsOf("", 0, 3), ElementsAre(ProgressCall(0.0)));
-}
-
-TEST_F(CheckoutProgress, SetsZeroOnceWhenThereIsNothingToDo)
-{
     EXPECT_THAT(callsOf(nullptr, 0, 0), ElementsAre(ProgressCall(0.0)));
     EXPECT_THAT(callsOf("file", 0, 0), ElementsAre(ProgressCall(0.0)));
-}
-
-TEST_F(CheckoutProgress, TellsNothingOfALaterStepWithoutAPathOrATotal)
-{
     EXPECT_THAT(callsOf(nullptr, 2, 3), IsEmpty());
     EXPECT_THAT(callsOf("", 2, 3), IsEmpty());
     EXPECT_THAT(callsOf("file", 2, 0), IsEmpty());
     EXPECT_THAT(callsOf(nullptr, greatest, 0), IsEmpty());
 }
 
-TEST_F(CheckoutProgress, DividesOverTheWholeRange)
+TEST_F(CheckoutProgress, DividesOverTheWholeRangeAndLeavesAFractionAboveOneAsItIs)
 {
     const std::size_t half = greatest / 2 + 1;
     EXPECT_EQ(callsOf("f", greatest, greatest).front(), ProgressCall(1.0));
     EXPECT_EQ(callsOf("f", half, greatest).front(), ProgressCall(0.5));
     EXPECT_EQ(callsOf("f", greatest, 1).front(), ProgressCall(18446744073709551616.0));
     EXPECT_EQ(callsOf("f", 1, greatest).front(), ProgressCall(1.0 / 18446744073709551616.0));
-}
-
-TEST_F(CheckoutProgress, LeavesAFractionAboveOneAsItIs)
-{
     EXPECT_EQ(callsOf("f", 3, 2).front(), ProgressCall(1.5));
 }
 
@@ -211,19 +171,6 @@ TEST_F(CheckoutProgress, SpeaksTheLanguageOfTheMoment)
     const LocaleOfTheProcess japanese("ja");
     EXPECT_THAT(callsOf("\xE6\x9D\xB1", 1, 2),
                 ElementsAre(0.5, message(u"\u6771 をチェックアウトしています")));
-}
-
-TEST_F(CheckoutProgress, NamesAFileThatIsNoUtf8)
-{
-    EXPECT_THAT(callsOf("caf\xE9", 1, 1), ElementsAre(1.0, message(test::asUtf16("Checking out ") +
-                                                                   test::asUtf16("caf\xE9"))));
-    const ustring &text = interactor_.progress.messages.back();
-    EXPECT_EQ(text.back(), char16_t{0xDCE9});
-}
-
-TEST_F(CheckoutProgress, KeepsWhatAPathSharesWithPlaceholders)
-{
-    EXPECT_THAT(callsOf("%1% 100%", 1, 1), ElementsAre(1.0, message(u"Checking out %1% 100%")));
 }
 
 TEST_F(CheckoutProgress, TellsItsArgumentsInOneRecord)
@@ -241,7 +188,7 @@ TEST_F(CheckoutProgress, TellsItsArgumentsInOneRecord)
                      " pathStr= completed_steps=18446744073709551615 total_steps=0")));
 }
 
-TEST_F(CheckoutProgress, AsksForTheDisplayAtEachStep)
+TEST_F(CheckoutProgress, AsksForTheDisplayAtEachStepBeforeAllElse)
 {
     test::RecordingProgressReporter other;
     callsOf("file", 1, 2);
@@ -249,10 +196,6 @@ TEST_F(CheckoutProgress, AsksForTheDisplayAtEachStep)
     EXPECT_THAT(callsOf("file", 2, 2), IsEmpty());
     EXPECT_THAT(other.calls, ElementsAre(1.0, message(u"Checking out file")));
     EXPECT_EQ(interactor_.asked, 2);
-}
-
-TEST_F(CheckoutProgress, AsksForTheDisplayBeforeAllElse)
-{
     const LogCapture log;
     interactor_.isLost = true;
     EXPECT_THROW(callbacks_.checkoutProgress("file", 1, 2), std::runtime_error);
@@ -297,14 +240,18 @@ git_checkout_perfdata makePerfData()
     return data;
 }
 
-TEST_F(CheckoutPerfData, TellsTheCountsInOneRecord)
+TEST_F(CheckoutPerfData, TellsTheCountsInOneRecordAndNeitherReachesTheHostNorPolls)
 {
     const LogCapture log;
+    interactor_.cancel();
     const git_checkout_perfdata data = makePerfData();
-    callbacks_.perfData(&data);
+    EXPECT_NO_THROW(callbacks_.perfData(&data));
     EXPECT_THAT(log.records(),
                 ElementsAre(isRecord(SeverityProgress, "Calls to chmod / mkdir / stat : 1 / 2 / "
                                                        "18446744073709551615")));
+    EXPECT_EQ(interactor_.asked, 0);
+    EXPECT_THAT(interactor_.progress.calls, IsEmpty());
+    EXPECT_THROW(notifyOfNothing(), CancelledOperationException);
 }
 
 /// How many records `call` begins while those of this severity are off.
@@ -324,16 +271,6 @@ TEST_F(CheckoutCallbacksTest, BeginNoRecordWhoseSeverityIsOff)
     EXPECT_EQ(recordsBegunWithout(SeverityProgress, [&] { notifyOfNothing(); }), 0);
     EXPECT_EQ(recordsBegunWithout(SeverityProgress, [&] { callbacks_.perfData(&data); }), 0);
     EXPECT_EQ(recordsBegunWithout(SeverityParameter, [&] { callsOf("file", 1, 1); }), 0);
-}
-
-TEST_F(CheckoutPerfData, NeitherReachesTheHostNorPolls)
-{
-    interactor_.cancel();
-    const git_checkout_perfdata data = makePerfData();
-    EXPECT_NO_THROW(callbacks_.perfData(&data));
-    EXPECT_EQ(interactor_.asked, 0);
-    EXPECT_THAT(interactor_.progress.calls, IsEmpty());
-    EXPECT_THROW(notifyOfNothing(), CancelledOperationException);
 }
 
 } // namespace

@@ -51,27 +51,19 @@ TEST(GitOptionsFactory, HasItsSlotsInOrder)
     EXPECT_EQ(slotOf(&GitOptionsFactory::makeMergeOptions), 8u);
 }
 
-TEST(GitOptionsFactory, SharesTheInteractor)
-{
-    for (const Make make : makers)
-    {
-        const auto interactor = std::make_shared<TestInteractor>();
-        auto factory = make(interactor);
-        EXPECT_EQ(interactor.use_count(), 2);
-        EXPECT_EQ(factory->getInteractor(), interactor);
-        factory.reset();
-        EXPECT_EQ(interactor.use_count(), 1);
-    }
-}
-
-TEST(GitOptionsFactory, TakesTheShareItIsGiven)
+TEST(GitOptionsFactory, TakesTheShareOfTheInteractorThatItIsGiven)
 {
     for (const Make make : makers)
     {
         auto interactor = std::make_shared<TestInteractor>();
-        const std::weak_ptr<TestInteractor> watch = interactor;
-        const auto factory = make(std::move(interactor));
+        const std::weak_ptr<ApplicationInteractor> watch = interactor;
+        auto factory = make(interactor);
+        EXPECT_EQ(watch.use_count(), 2);
+        EXPECT_EQ(factory->getInteractor(), interactor);
+        factory = make(std::move(interactor));
         EXPECT_EQ(watch.use_count(), 1);
+        factory.reset();
+        EXPECT_TRUE(watch.expired());
     }
 }
 
@@ -106,13 +98,9 @@ TEST(GitOptionsFactory, HasTwoClassesThatDifferInTheThreeSlotsWithNestedValues)
     const auto tableOne = virtualTableOf(one, 9);
     const auto tableTwo = virtualTableOf(two, 9);
     for (const std::size_t slot : {2u, 3u, 5u})
-    {
         EXPECT_NE(tableOne[slot], tableTwo[slot]) << slot;
-    }
     for (const std::size_t slot : {4u, 6u, 7u, 8u})
-    {
         EXPECT_EQ(tableOne[slot], tableTwo[slot]) << slot;
-    }
 }
 
 } // namespace

@@ -73,15 +73,13 @@ class RemoteCredentials : public testing::Test
     RemoteCallbacks callbacks_{interactor_};
 };
 
-TEST_F(RemoteCredentials, AreTheAgentsWhereAnSshKeyIsTaken)
+TEST_F(RemoteCredentials, AreTheAgentsWhereAnSshKeyIsTakenAtEachRequestWithoutAskingTheHost)
 {
-    expectAgent(ask("ssh://git@host/path", "git", sshKey), "git");
-}
-
-TEST_F(RemoteCredentials, AreTheAgentsWhateverElseIsTaken)
-{
-    for (const unsigned others : {1u, 4u, 8u, 16u, 32u, 64u, 0x7Du, 0xFFFFFFFDu})
-        expectAgent(ask("url", "somebody", sshKey | others), "somebody");
+    interactor_.cancel();
+    for (const unsigned others : {0u, 1u, 4u, 8u, 16u, 32u, 64u, 0x7Du, 0xFFFFFFFDu})
+        expectAgent(ask("ssh://git@host/path", "git", sshKey | others), "git");
+    expectAgent(ask("url", "somebody", sshKey), "somebody");
+    EXPECT_TRUE(interactor_.progress.calls.empty());
 }
 
 TEST_F(RemoteCredentials, AreNoneWhereNoSshKeyIsTaken)
@@ -93,12 +91,8 @@ TEST_F(RemoteCredentials, AreNoneWhereNoSshKeyIsTaken)
         EXPECT_EQ(answer.code, -1) << types;
         EXPECT_EQ(answer.credential, nullptr) << types;
     }
-    EXPECT_TRUE(test::libgit2Release::isSilent()) << "libgit2 was asked";
-}
-
-TEST_F(RemoteCredentials, AreNoneForAUserNameAlone)
-{
     EXPECT_EQ(ask("ssh://host/path", nullptr, GIT_CREDENTIAL_USERNAME).code, -1);
+    EXPECT_TRUE(test::libgit2Release::isSilent()) << "libgit2 was asked";
 }
 
 TEST_F(RemoteCredentials, AreThoseOfLibGit2sAnswerWhereThereIsNoUser)
@@ -110,28 +104,21 @@ TEST_F(RemoteCredentials, AreThoseOfLibGit2sAnswerWhereThereIsNoUser)
     ASSERT_FALSE(test::libgit2Release::isSilent());
 }
 
-TEST_F(RemoteCredentials, AreTheSameAtEveryRequest)
-{
-    for (int request = 0; request < 20; ++request)
-        expectAgent(ask("ssh://git@host/path", "git", sshKey), "git");
-}
-
-TEST_F(RemoteCredentials, AskTheApplicationNothing)
-{
-    interactor_.cancel();
-    expectAgent(ask("ssh://git@host/path", "git", sshKey), "git");
-    EXPECT_TRUE(interactor_.progress.calls.empty());
-}
-
 TEST_F(RemoteCredentials, TellTheirRequestInOneRecord)
 {
     const LogCapture log;
     ask("ssh://git@host/path", "git", 3);
     ask("https://host/\xC3\xBC", "", 0xFFFFFFFDu);
+    EXPECT_EQ(ask(nullptr, nullptr, 0).code, -1);
+    EXPECT_EQ(ask("url", nullptr, 32).code, -1);
+    expectAgent(ask(nullptr, "user", sshKey), "user");
     EXPECT_THAT(log.messages(),
                 ElementsAre(" url=ssh://git@host/path username_from_url=git allowed_types=3",
                             " url=https://host/\xC3\xBC username_from_url= "
-                            "allowed_types=4294967293"));
+                            "allowed_types=4294967293",
+                            " url= username_from_url= allowed_types=0",
+                            " url=url username_from_url= allowed_types=32",
+                            " url= username_from_url=user allowed_types=2"));
     EXPECT_EQ(log.records().front().severity, unsigned{SeverityParameter});
 }
 
@@ -160,17 +147,6 @@ TEST_F(RemoteCredentials, ThatAreRefusedLeaveNoTextOfAnEarlierCall)
     git_error_set_str(GIT_ERROR_CONFIG, "config value 'http.followRedirects' was not found");
     expectAgent(ask("ssh://git@host/path", "git", sshKey), "git");
     EXPECT_TRUE(test::libgit2Release::isSilent());
-}
-
-TEST_F(RemoteCredentials, TellTheirRequestWithoutAUrlOrAUser)
-{
-    const LogCapture log;
-    EXPECT_EQ(ask(nullptr, nullptr, 0).code, -1);
-    EXPECT_EQ(ask("url", nullptr, 32).code, -1);
-    expectAgent(ask(nullptr, "user", sshKey), "user");
-    EXPECT_THAT(log.messages(), ElementsAre(" url= username_from_url= allowed_types=0",
-                                            " url=url username_from_url= allowed_types=32",
-                                            " url= username_from_url=user allowed_types=2"));
 }
 
 TEST_F(RemoteCredentials, ThatAreRefusedLeaveNoExceptionBehind)

@@ -50,13 +50,6 @@ TEST(CheckoutOptions, BeginSafe)
     EXPECT_EQ(CheckoutOptions().checkoutStrategy, std::uint64_t{GIT_CHECKOUT_SAFE});
 }
 
-TEST(CheckoutOptions, HoldMoreThanLibGit2Takes)
-{
-    CheckoutOptions options;
-    options.checkoutStrategy = 0x1'0000'0002u;
-    EXPECT_EQ(options.checkoutStrategy, 0x1'0000'0002u);
-}
-
 TEST(PushOptions, BeginWithOneThread)
 {
     const PushOptions options;
