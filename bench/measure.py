@@ -1,6 +1,6 @@
 #!/usr/bin/env python3
 # SPDX-License-Identifier: MIT
-"""Compares the library with the floor. Called by scripts/bench, which tells what is measured."""
+"""Compares the library with the floor. scripts/bench calls it, and describes what is measured."""
 
 import argparse
 import concurrent.futures
@@ -20,7 +20,7 @@ SIZES = {1_000: 31, 10_000: 15, 100_000: 7}  # files: rounds of paired runs
 LISTS = (100, 1_000)
 LIST_ROUNDS = 5
 # A list costs libgit2 names times files: callgrind would need an hour for 1,000 of 100,000, and many
-# minutes for several counts of what one count tells well enough.
+# minutes for several counts if one is enough.
 MOST_COMPARISONS = 10_000_000
 MOST_COMPARISONS_COUNTED_OFTEN = 1_000_000
 
@@ -47,7 +47,7 @@ class Bench:
         self._remotes = RemoteBench(self._programs, scratch)
         self._sizes = sizes
         self._scratch = scratch
-        # Short names, since the root stands in every key of the result.
+        # Short names, because the root is in every key of the result.
         self._roots = {size: os.path.join(scratch, name) for size, name in zip(sizes, "abc")}
 
     def serving(self):

@@ -8,9 +8,9 @@ import subprocess
 
 import working_copies
 
-# Where glibc compares two paths near the end of a page it takes longer, and libgit2 compares each
-# path with those in its buffers: one call costs up to 5 % more where such a buffer lies there. So
-# the median of so many counts is taken, each with the program's heap moved by so many bytes more.
+# glibc takes longer to compare two paths near the end of a page, and libgit2 compares each path with
+# those in its buffers: one call costs up to 5 % more if such a buffer is there. So the median of COUNTS
+# counts is used, each with the program's heap moved by DISPLACEMENT more bytes.
 COUNTS = 3
 DISPLACEMENT = 528
 

@@ -19,7 +19,7 @@ void storeCallbackException(std::exception_ptr &&exception);
 int callbackErrorCode() noexcept;
 
 /// Logs the exception in flight and the stack. Call it inside a handler.
-/// @throws what the sinks raise
+/// @throws what the sinks throw
 void reportCallbackException();
 
 /// Handles the exception in flight for a callback: logs it, stores it in the thread's slot for

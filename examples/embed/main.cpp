@@ -88,7 +88,7 @@ int main(int count, char **arguments)
     }
     catch (const foundation::core::except::IUserException &exception)
     {
-        // The library's own failures, told in the language of the user.
+        // The library's own failures, in the language of the user.
         std::cerr << fl::i18n::ustring_to_utf8(exception.GetUnicodeMessageTxt()) << '\n';
     }
     catch (const std::exception &exception)

@@ -31,7 +31,7 @@ extern "C" void handOver(int signal)
     errno = error;
 }
 
-/// Keeps the signals from threads that are started meanwhile.
+/// Blocks the signals for threads that are started while it lives.
 class HeldBack
 {
   public:

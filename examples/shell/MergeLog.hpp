@@ -25,9 +25,9 @@ struct MergeNotes
 /// Takes the note that a record of the library's log is of, if it is of any.
 void takeNote(MergeNotes &notes, const std::string &record);
 
-/// While it lives, takes notes from the library's log: the back end tells its caller neither which
-/// commands have refused a file nor libgit2's code of a merge that failed. At most one object at a
-/// time.
+/// While it lives, reads notes from the library's log: the back end does not report to its caller
+/// which commands have refused a file, and libgit2's code of a failed merge. At most one object at
+/// a time.
 class MergeLog
 {
   public:

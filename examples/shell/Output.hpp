@@ -44,13 +44,13 @@ bool errorsCanBeRedrawn() noexcept;
 /// where that is no terminal.
 void remark(const std::string &text);
 
-/// Lets the program go on when nobody reads its output or its messages any more, as in a pipe to
-/// "head": a merge must not end in the midst of its writing. Programs that are started meanwhile
-/// end by the signal as usual. Where the signal was ignored before, it stays ignored.
+/// Lets the program continue if nobody reads its output or its messages any more, as in a pipe to
+/// "head": a merge must not end in the middle of its writing. The signal still ends programs that
+/// this one starts. If the signal was ignored before, it stays ignored.
 void surviveClosedPipes();
 
-/// Makes sure that standard input, output and error are taken, so that no file that is opened later
-/// gets one of their numbers and what is meant for it. Where one was closed, using it still fails.
+/// Opens standard input, output and error if they are closed, so that no later file gets one of
+/// their numbers and receives their data. If one was closed, using it still fails.
 void holdStandardDescriptors();
 
 } // namespace vclink::shell

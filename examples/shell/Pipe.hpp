@@ -4,7 +4,7 @@
 namespace vclink::shell
 {
 
-/// A pipe that programs started meanwhile do not inherit. Writing to it never waits.
+/// A pipe that started programs do not inherit. Writing to it never waits.
 class Pipe
 {
   public:

@@ -40,8 +40,8 @@ bool isSecondHalf(char16_t unit)
     return unit >= 0xDC00 && unit <= 0xDFFF;
 }
 
-/// The text, or its end after three dots where it takes more columns: the end of a path tells more
-/// than its beginning.
+/// The text, or three dots and its end if it needs more columns: the end of a path says more than
+/// its beginning.
 ustring fit(const ustring &text, std::size_t columns)
 {
     const ustring dots = u"...";

@@ -13,7 +13,7 @@ namespace vclink::shell
 class RecordReader
 {
   public:
-    /// @param severities of the records to read; they are enabled meanwhile
+    /// @param severities of the records to read; enabled while the object lives
     /// @param take called with the text of each, on the thread that writes it
     RecordReader(unsigned severities, std::function<void(const std::string &)> take);
     RecordReader(const RecordReader &) = delete;

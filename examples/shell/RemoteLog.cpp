@@ -36,7 +36,7 @@ bool takeFront(std::string_view &text, std::string_view beginning)
 
 void noteCredentials(RemoteNotes &notes, std::string_view request)
 {
-    // An address may hold anything, the number stands at the end.
+    // An address can contain anything; the number is at the end.
     const std::size_t digits = request.find_last_of('=') + 1;
     unsigned kinds = 0;
     std::from_chars(request.data() + digits, request.data() + request.size(), kinds);

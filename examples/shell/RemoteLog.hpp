@@ -39,9 +39,8 @@ struct RemoteNotes
 /// Takes the note that a record of the library's log is of, if it is of any.
 void takeNote(RemoteNotes &notes, const std::string &record);
 
-/// While it lives, takes notes from the library's log: an operation with a remote tells its caller
-/// neither what credentials were asked for nor which references were rejected, and logs both. At
-/// most one object at a time.
+/// While it lives, reads notes from the library's log: an operation with a remote only logs which
+/// credentials were requested and which references were rejected. At most one object at a time.
 class RemoteLog
 {
   public:

@@ -28,10 +28,10 @@ struct Cover
 
 /// A short list that means, to the back end, all files that are to be acted on, of those named and
 /// below the folders named, and no others that matter: it looks each of the working copy's files up
-/// in the whole list, which takes long where thousands of files are named. A folder that the back
-/// end takes as a name for all below it stands for itself.
+/// in the whole list, which takes long where thousands of files are named. A folder stays in the
+/// list if the back end treats it as everything below it.
 /// @param isMeant whether a file of this state is to be acted on
-/// @throws what the system raises when the folder can't be read
+/// @throws what the system throws if the folder cannot be read
 Cover cover(const upath &root, const std::vector<NamedPath> &paths,
             const std::function<bool(FileState::State)> &isMeant, LinkNames links);
 

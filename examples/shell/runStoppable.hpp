@@ -22,9 +22,9 @@ enum class Stops
 };
 
 /// Runs an operation of the back end, with Ctrl-C, SIGTERM and SIGHUP asking it to stop; see
-/// InterruptWatch. The person is told at once what becomes of the request. If the operation fails
-/// after it was asked to stop, its failure is reported here. SIGTERM and SIGHUP also set the
-/// session's status at the end.
+/// InterruptWatch. Says at once what happens to the request. If the operation fails after it was
+/// asked to stop, its failure is reported here. SIGTERM and SIGHUP also set the session's status at
+/// the end.
 /// @return Done, or endedBy() the signal for such a failure
 /// @throws what the operation throws if nobody has asked to stop
 ExitStatus runStoppable(Session &session, Stops stops, const std::function<void()> &operation);

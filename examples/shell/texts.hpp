@@ -8,8 +8,8 @@
 namespace vclink::shell
 {
 
-/// A sentence of the program in the other languages that it speaks. "%1%" stands for the first
-/// value that is filled in, and so on.
+/// A sentence of the program in its other languages. "%1%" is replaced by the first value, and so
+/// on.
 struct Translation
 {
     const char *english;

@@ -17,13 +17,13 @@ struct TranslationTable
     std::size_t size;
 };
 
-/// Of the command line and its help.
+/// Texts of the command line and its help.
 TranslationTable helpTexts();
-/// Of the help of the single commands.
+/// Texts of the help of single commands.
 TranslationTable commandHelpTexts();
-/// Of what commands do.
+/// Texts of what commands do.
 TranslationTable resultTexts();
-/// Of why something is not done.
+/// Texts of why something is not done.
 TranslationTable refusalTexts();
 /// Of failures, and what to do about them.
 TranslationTable failureTexts();

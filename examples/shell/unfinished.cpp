@@ -104,8 +104,8 @@ bool isMergeUnderWay(CMAdapter &adapter)
 
 bool isMergeInterrupted(CMAdapter &adapter)
 {
-    // Of the library; it removes what is left of it once no merge is under way. git's merges leave
-    // the other file.
+    // The library's file; the library removes an old one when no merge is under way. git's merges
+    // leave the other file.
     return isMergeUnderWay(adapter) && stands(adapter, "vclink-merge") &&
            !stands(adapter, "AUTO_MERGE");
 }

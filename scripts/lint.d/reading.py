@@ -10,8 +10,8 @@ import subprocess
 import threading
 import time
 
-# What is said of the file that is compiled and not of what it includes: these look at each changed
-# unit by itself. All others say the same of units that are read together.
+# Checks of the compiled file and not of what it includes: they read each changed unit by itself. All
+# others have the same remarks on units that are read together.
 OF_THE_UNIT = ("misc-unused-alias-decls", "misc-unused-using-decls")
 ALONE, TOGETHER = "alone", "together"
 MOST_TOGETHER = 20

@@ -9,8 +9,10 @@ import re
 import subprocess
 import sys
 
-# Turns of phrase in 1,000 words of a part.
+# The most turns of phrase in 1,000 words of a part.
 LIMIT = 1.5
+# Comments of tests are not yet rewritten. This limit may only fall.
+LIMITS = {"comments of tests": 6.0}
 
 START = r"(?:\A\s*|[.;:|!?]\s+|\n[ ]*\n\s*)"
 PHRASES = [
@@ -31,7 +33,7 @@ PHRASES = [
     (r"\bof\s+the\s+moment\b", "current"),
     (r"\b(?:raises?|raised|raising)\b(?!\s+the\s+(?:\w+\s+)?version)", "throws"),
     (START + r"Of\s+(?:a|an|the|two|what)\b", "the subject first"),
-    (START + r"Where\s+(?!is\b|are\b|do\b|does\b)[^.?|:;]{1,120},", "if"),
+    (START + r"Where\s+(?!is\b|are\b|do\b|does\b)[^.?|:;]{1,120},(?! and\b)", "if"),
     (r"\b[Ww]hat\s+is\s+not\s+so\b", "the subject first"),
     (r"\bis\s+(?:libgit2|git)'s\s+to\s+\w+", "libgit2 decides"),
 ]
@@ -160,7 +162,7 @@ def main():
     failed = False
     for part, number in words.items():
         share = 1000 * len(found[part]) / max(number, 1)
-        over = share > LIMIT
+        over = share > LIMITS.get(part, LIMIT)
         failed |= over
         print(f"   {part}: {share:.2f} in 1,000 of {number:,} words{' (too many)' if over else ''}")
         if over or options.list:

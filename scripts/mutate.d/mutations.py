@@ -58,7 +58,7 @@ class Mutation:
         return source[: self.begin] + self.after + source[self.end :]
 
     def lines(self, source):
-        """What stood in the lines concerned, and what stands there now, without their layout."""
+        """The old and the new text of the changed lines, without their layout."""
         begin = source.rfind("\n", 0, self.begin) + 1
         end = source.find("\n", self.end)
         before = source[begin:end]
@@ -100,7 +100,7 @@ class Finder:
         return self.found
 
     def _match_brackets(self):
-        """For each bracket its partner, for each token the bracket that it stands in."""
+        """For each bracket its partner, for each token its enclosing bracket."""
         partner, enclosing, open_ones = {}, [], []
         for index, token in enumerate(self.tokens):
             enclosing.append(open_ones[-1] if open_ones else None)
@@ -114,7 +114,7 @@ class Finder:
         return partner, enclosing
 
     def _find_functions(self):
-        """For each token whether it stands in the body of a function."""
+        """For each token whether it is in the body of a function."""
         inside, kinds = [], []
         for index, token in enumerate(self.tokens):
             if token.kind == "operator" and token.text == "{":
@@ -157,7 +157,7 @@ class Finder:
         inside = range(begin + 1, end)
         last_semicolon = max((i for i in inside if self._text(i) == ";"), default=begin)
         texts = [self._text(i) for i in range(last_semicolon + 1, end)]
-        # The same comes of the operator in it.
+        # A change of the operator in it has the same effect.
         if not {"&&", "||"} & set(texts) and (texts[0] == "!" or {"==", "!="} & set(texts)):
             return
         condition = self.source[self.tokens[last_semicolon].end : self.tokens[end].begin].strip()
@@ -272,7 +272,7 @@ class Finder:
         return False
 
     def _declares(self, index):
-        """Whether a name, or a star or ampersand that belongs to one, stands there."""
+        """Whether a name, or a star or ampersand of a name, is there."""
         token = self.tokens[index]
         if token.text in ("*", "&", "&&"):
             return not self.source[token.end].isspace()

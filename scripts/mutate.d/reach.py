@@ -22,7 +22,7 @@ Test = collections.namedtuple("Test", "program name seconds")
 
 
 class Reach:
-    """What the programs of a workplace have recorded, each anew only when it has changed."""
+    """What the programs of a workplace have recorded. A program records again only if it has changed."""
 
     def __init__(self, workplace):
         self.workplace = workplace
@@ -54,8 +54,8 @@ class Reach:
     def _reaching(self, mutation, source):
         """The tests that reach a place in the mutant's lines or around.
 
-        Around, because the compiler leaves out places that others stand for. Outside of functions
-        those that reach the file; all where a file has no places.
+        Around, because the compiler leaves out places that others imply. Outside of functions the tests
+        that reach the file; all tests if a file has no places.
         """
         lines = self.lines.get(mutation.file)
         if lines is None:

@@ -14,7 +14,7 @@ ScopedCleanup::~ScopedCleanup()
             cleanup();
         }
     }
-    catch (...) // The scope's own outcome stands.
+    catch (...) // The result of the scope counts.
     {
     }
 }
