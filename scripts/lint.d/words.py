@@ -56,7 +56,7 @@ MESSAGES = [
     ("messages", r"(?:scripts|\.ci)/[^.]*$", "help"),
 ]
 # German and Japanese, inputs of fuzzing, and names that tests misspell.
-NOT_SPELT = r"host/po/|fuzz/corpus/|examples/.*(?:[tT]exts|language)\.cpp$|tests/shell/|.*\.(?:png|1)$"
+NOT_SPELT = r"host/po/|fuzz/corpus/|examples/.*(?:[tT]exts|language)\.cpp$|tests/shell/|tests/scripts/words\.bash|.*\.(?:png|1)$"
 IGNORED_WORDS = "commitin,nd"
 
 PIECES = re.compile(r"(?P<comment>//[^\n]*|/\*.*?\*/)|R\"(?P<mark>\w*)\(.*?\)(?P=mark)\""
