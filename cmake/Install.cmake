@@ -11,7 +11,7 @@ install(DIRECTORY include/
 vclink_install_package_files(vclink_git "${PROJECT_SOURCE_DIR}/cmake/package"
     COMPONENT development)
 
-# Laid as they are here, so that their links lead to each other, and to the examples.
+# In the same layout as here, so that their links lead to each other and to the examples.
 install(FILES README.md CHANGELOG.md SECURITY.md
     DESTINATION share/doc/libvclink-git-dev
     COMPONENT development)
@@ -19,6 +19,9 @@ install(DIRECTORY docs
     DESTINATION share/doc/libvclink-git-dev
     COMPONENT development
     FILES_MATCHING PATTERN "*.md" PATTERN "*.png")
+if(VCLINK_API_PAGES)
+    include(cmake/ApiPages.cmake)
+endif()
 install(DIRECTORY examples/desktop examples/embed examples/integrating
     DESTINATION share/doc/libvclink-git-dev/examples
     COMPONENT development)
