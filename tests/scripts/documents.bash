@@ -83,7 +83,7 @@ reads crashes '300 kills, 281 of them inside an operation; 200 commits kept, not
 commit: killed inside 28, of these left a lock 24, a merge 0
 300 kills, 281 of them inside; 200 commits kept, 111 times locks removed
 END_OF_LOG
-reads situations '1,300 situations, and 33 with siblings; nothing lost' <<'END_OF_LOG'
+reads situations '1,300 situations, and 33 beside similar names; nothing lost' <<'END_OF_LOG'
 1000 situations of merge
 300 situations of switch
 33 situations of merge beside siblings
