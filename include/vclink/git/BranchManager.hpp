@@ -95,10 +95,13 @@ class VCLINK_GIT_EXPORT BranchManager
     /// configuration and attributes name.
     ///
     /// A fast-forward refuses as switchBranch does. Any other merge refuses before anything is
-    /// written if a tracked file has uncommitted changes, even a file that the merge does not
-    /// touch, if it would overwrite an untracked file, and if a symbolic link, FIFO, socket or
-    /// device is in the way. The merge drivers may have run by then. The added text names the first
-    /// such file, except files that the merge touches itself: libgit2 only counts these.
+    /// written
+    /// - if a tracked file has uncommitted changes, even a file that the merge does not touch,
+    /// - if it would overwrite an untracked file, or
+    /// - if a symbolic link, FIFO, socket or device is in the way.
+    ///
+    /// The merge drivers may have run by then. The added text names the first file, except if the
+    /// merge itself touches it: libgit2 only counts such files.
     ///
     /// Restores missing files and overwrites ignored ones. Keeps the folders of submodules; the
     /// merge commit records the submodules' commits as merged, whatever is checked out in them.

@@ -57,9 +57,9 @@ namespace vclink::git
 /// shared_vclink::git::NoFilesToRemove if no file is left to remove. git_index_remove_all.
 ///
 /// @section adapter_markResolved markResolved
-/// Marks a conflict as resolved: replaces the entries of a file in the index, including those of a
-/// conflict, by the current file, or removes them if the file does not exist. A link without a
-/// target counts as missing. git_index_add_all, git_index_remove_all.
+/// Marks a conflict in a file as resolved. Replaces the entries of the file in the index, with or
+/// without a conflict, by the current file. Removes them if the file does not exist. A link without
+/// a target counts as missing. git_index_add_all, git_index_remove_all.
 ///
 /// @section adapter_commit commit
 /// Commits every tracked file as it is on disk, staged or not, on HEAD, and concludes a merge or
