@@ -14,6 +14,7 @@
 
 #include "error/errorUtil/GitResult.hpp"
 #include "error/errorUtil/raiseSystemError.hpp"
+#include "main/files/EmptiedFiles.hpp"
 #include "util/repository/repository.hpp"
 
 namespace vclink::git
@@ -114,6 +115,7 @@ void restoreDropped(git_repository *repository, git_index *index, git_index *bef
 void refreshIndex(git_repository *repository, git_index *index)
 {
     const std::size_t countBefore = git_index_entrycount(index);
+    stageEmptiedFiles(repository, index);
     check(git_index_update_all, index, nullptr, nullptr, nullptr);
     if (git_index_entrycount(index) < countBefore)
     {

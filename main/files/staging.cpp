@@ -6,6 +6,7 @@
 #include "error/errorUtil/gitString.hpp"
 #include "error/raise.hpp"
 #include "fl/filesystem/operations.hpp"
+#include "main/files/EmptiedFiles.hpp"
 #include "main/files/GitAdapter.hpp"
 #include "util/lock/IndexLock.hpp"
 #include "util/path/PathspecArray.hpp"
@@ -89,8 +90,10 @@ void GitAdapter::addToIndex(const std::vector<upath> &files)
     IndexLock lock(repository.get());
     const OwnedHandle<git_index> index = getRepositoryIndex(repository.get());
     const PathspecArray pathspec = makeFilePathspec(files, root_);
+    const EmptiedFiles emptied(repository.get(), index.get(), pathspec.array());
     check(git_index_add_all, index.get(), getArrayPointer(pathspec), GIT_INDEX_ADD_DEFAULT,
           acceptAllPaths, this);
+    emptied.giveBack(index.get());
     writeIndex(index.get());
     lock.publish();
 }

@@ -76,6 +76,7 @@ const std::vector<Unexamined> &allUnexamined()
         {"", "git_attr_cache_flush"},
         {"", "git_oid_cpy"},
         {"", "git_oid_fmt"},
+        {"", "git_index_caps"},
         {"merge", "git_merge_analysis"},
         {"merge", "git_attr_get"},
     };
@@ -142,6 +143,8 @@ std::vector<Tolerance> tolerancesOfOthers(const std::string &operation, const st
     return {
         // Only a missing folder is no failure of a probe.
         {"isAdapterFor", "git_repository_open_ext", any, GIT_ENOTFOUND, "done: 0"},
+        // Any answer but no means that the file is listed.
+        {"", "git_pathspec_matches_path", any, any, normal},
         // Without a HEAD the files are taken out of the index.
         {"revert", "git_revparse_single", any, any, normal},
         // The end of a list.

@@ -93,6 +93,15 @@ void makeSparse(GitRepository &repository)
     repository.remove("file");
 }
 
+void makeEmptied(GitRepository &repository)
+{
+    repository.write(".gitattributes", "* text\n");
+    makePlain(repository);
+    repository.write("file", "");
+    repository.write("other", "");
+    repository.write("new", "new\n");
+}
+
 void makeUnreadable(GitRepository &repository)
 {
     makePlain(repository);

@@ -22,6 +22,8 @@ void makeUnindexed(GitRepository &repository);
 void makeAnonymous(GitRepository &repository);
 /// Plain, and "file" gone from the working tree, "sub/inside" left out of it by a sparse checkout.
 void makeSparse(GitRepository &repository);
+/// Plain under line-end conversion, "file" and "other" empty now, "new" unversioned.
+void makeEmptied(GitRepository &repository);
 /// Plain, and a link to itself in the place of "sub", so that "sub/inside" can't be looked at.
 void makeUnreadable(GitRepository &repository);
 /// Plain, and "file" staged as a link.
