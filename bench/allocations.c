@@ -8,7 +8,7 @@
 
 #define EXPORTED __attribute__((visibility("default")))
 
-// The allocator that this library stands in front of.
+// The allocator that this library replaces.
 extern void *__libc_malloc(size_t size);
 extern void *__libc_calloc(size_t count, size_t size);
 extern void *__libc_realloc(void *block, size_t size);

@@ -139,7 +139,7 @@ static int appendMergeHead(const git_oid *id, void *payload)
     return 0;
 }
 
-/// What the library's commit does at the end of a merge, which opens the repository anew.
+/// What the library's commit does at the end of a merge, for which it opens the repository again.
 static void commitMerge(const char *root, const char *name)
 {
     git_repository *const repository = openRepository(root);

@@ -7,10 +7,10 @@
 namespace vclink::fuzz
 {
 
-/// While it lives, this process changes files in the given folders only, starts no other process
-/// and talks to no network: what would is refused, and a change elsewhere is remembered. It stands
-/// in for the functions of the C library by which libgit2 and this library do so; a program that
-/// links it has these replaced. For one thread, and one object at a time.
+/// While it lives, this process changes files only in the given folders, starts no other process
+/// and uses no network: other calls are refused, and a change elsewhere is remembered. It replaces
+/// the functions of the C library that libgit2 and this library use for that, in every program that
+/// links it. For one thread, and one object at a time.
 class Confinement
 {
   public:

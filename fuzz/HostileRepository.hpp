@@ -22,10 +22,10 @@ class HostileRepository
     /// Whether libgit2 would ask for all memory, as it is known to do of some indexes.
     static bool isRefused(const std::string &input);
 
-    /// Makes both repositories anew, then writes the files that the input holds: behind a line
-    /// "@@ NAME" all up to the next of these lines. Files that Git keeps in the working tree are
-    /// written there, others into its folder; names that are not foreseen are left out. "$TOP" in a
-    /// configuration means top(), and an index gets the checksum of what is in it.
+    /// Makes both repositories again, then writes the files in the input: after a line "@@ NAME"
+    /// everything up to the next such line. Files that Git keeps in the working tree are written
+    /// there, others into its folder; unknown names are left out. "$TOP" in a configuration means
+    /// top(), and an index gets the checksum of its content.
     void restore(const std::string &input) const;
 
     /// What lies around the two repositories. Nothing writes there.
@@ -41,7 +41,7 @@ class HostileRepository
     {
         return run_ / "origin";
     }
-    /// Where both have their objects, which are told apart from unused ones by their time.
+    /// The folder with the objects of both, which are recognised by their time.
     std::filesystem::path objects() const
     {
         return folder_ / "objects";

@@ -93,7 +93,7 @@ bool isAttributeName(const std::string &name)
            name.find_first_not_of(characters) == std::string::npos;
 }
 
-/// Whether a value can stand in a line. libgit2 takes an empty one for none.
+/// Returns true if a value can be in a line. libgit2 treats an empty one as none.
 bool isAttributeValue(const std::string &value)
 {
     return !value.empty() &&
