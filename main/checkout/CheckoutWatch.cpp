@@ -126,8 +126,7 @@ CheckoutWatch::CheckoutWatch(CheckoutKind kind, git_repository *repository,
     record.notify_payload = this;
     record.progress_cb = passProgress;
     record.progress_payload = this;
-    // A link or a FIFO that appears later must not be written through, or wait for a reader,
-    // either.
+    // Also for a link or a FIFO that appears later.
     record.file_open_flags = O_CREAT | O_TRUNC | O_WRONLY | O_NOFOLLOW | O_NONBLOCK;
 }
 
@@ -331,8 +330,7 @@ void CheckoutWatch::noteUntracked(const CheckoutNotice &notice)
 }
 
 /// Removes what no rule protects and libgit2 would write through or fail at: an ignored link in the
-/// place of a new file, and an empty folder in the place of any file if libgit2 has already passed
-/// it.
+/// place of a new file, and an empty folder in the place of any file that libgit2 has passed.
 void CheckoutWatch::makeWay(const CheckoutNotice &notice)
 {
     const bool isNew = notice.baseline == nullptr;
