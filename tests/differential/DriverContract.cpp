@@ -136,6 +136,8 @@ std::pair<End, End> endsFor(DriverExpectation::Kind kind)
         return {End::Conflict, End::Merged};
     case DriverExpectation::OnlyGitGivesUp:
         return {End::GivenUp, End::Merged};
+    case DriverExpectation::GitGivesUpAConflict:
+        return {End::GivenUp, End::Conflict};
     case DriverExpectation::BothGiveUp:
         return {End::GivenUp, End::GivenUp};
     default:

@@ -52,6 +52,8 @@ struct DriverExpectation
         OnlyLibraryMerges,
         /// git gives the merge up, the library has merged
         OnlyGitGivesUp,
+        /// git gives the merge up, the library is in conflict
+        GitGivesUpAConflict,
         /// the library gives the merge up and has changed nothing, git does not give up
         OnlyLibraryGivesUp,
         /// nothing is changed by either

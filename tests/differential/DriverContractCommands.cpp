@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 // What the command is given, how it is read, how it ends.
 #include "DriverContract.hpp"
+#include "support/gitRelease.hpp"
 
 namespace vclink::test
 {
@@ -55,6 +56,17 @@ DriverCase refuses(const std::string &name, const std::string &end)
                 {Kind::OtherFileInConflict, "kept\n", conflictMarkers});
 }
 
+/// A refusal by which git may give the whole merge up.
+DriverCase refusesAll(const std::string &name, const std::string &end)
+{
+    DriverCase result = refuses(name, end);
+    if (gitRelease::driverCanEndMerge())
+    {
+        result.expectation = {Kind::GitGivesUpAConflict, "ours\n", conflictMarkers};
+    }
+    return result;
+}
+
 DriverCase commands(const std::string &name, const std::string &command,
                     const DriverExpectation &expectation)
 {
@@ -102,6 +114,7 @@ std::vector<DriverCase> commandCases()
 {
     const std::string fiftyThousand = "dd if=/dev/zero bs=1000 count=50 2>/dev/null";
     const DriverExpectation notStarted{Kind::OnlyLibraryGivesUp, "", ""};
+    const DriverExpectation noneStarted{Kind::BothGiveUp, "ours\n", "ours\n"};
     return {
         describes("WordsInDoubleQuotes", "1 %A \"a b\" \"\""),
         describes("ManyBlanks", "  1   %A    a  "),
@@ -120,9 +133,9 @@ std::vector<DriverCase> commandCases()
         refuses("Status2", "exit 2"),
         refuses("Status127", "exit 127"),
         refuses("Status128", "exit 128"),
-        refuses("Status255", "exit 255"),
-        refuses("SignalKill", "kill -9 $$"),
-        refuses("SignalTerm", "kill -15 $$"),
+        refusesAll("Status255", "exit 255"),
+        refusesAll("SignalKill", "kill -9 $$"),
+        refusesAll("SignalTerm", "kill -15 $$"),
         runs("PrintsNothing", "echo merged >\"$2\""),
         runs("PrintsALot", "seq 1 200000; echo merged >\"$2\""),
         runs("PrintsALotBeforeAnEmptyLine", "seq 1 200000; echo; echo merged >\"$2\""),
@@ -133,7 +146,7 @@ std::vector<DriverCase> commandCases()
         commands("IsNotExecutable", "/etc/hostname %A", notStarted),
         commands("IsAFolder", "/ %A", notStarted),
         commands("IsNotClosed", "true \"", notStarted),
-        commands("IsEmpty", "", {Kind::BothGiveUp, "ours\n", "ours\n"}),
+        commands("IsEmpty", "", gitRelease::emptyDriverEndsMerge() ? noneStarted : notStarted),
         commands("IsBlank", "  ", notStarted),
     };
 }
