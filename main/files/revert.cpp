@@ -15,6 +15,7 @@
 #include "fl/i18n/convert.hpp"
 #include "main/checkout/CheckoutWatch.hpp"
 #include "main/files/GitAdapter.hpp"
+#include "main/files/foldersInIndex.hpp"
 #include "options/gitRecords.hpp"
 #include "util/lock/IndexLock.hpp"
 #include "util/path/PathspecArray.hpp"
@@ -93,6 +94,10 @@ void resetEntries(git_repository *repository, const git_object *head, const Path
     if (head != nullptr && !areIndexed(index.get(), names))
     {
         resetToHead(repository, head, pathspec, names.size());
+    }
+    if (takeOutBelowFiles(index.get(), pathspec))
+    {
+        writeIndex(index.get());
     }
 }
 

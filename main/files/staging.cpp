@@ -8,6 +8,7 @@
 #include "fl/filesystem/operations.hpp"
 #include "main/files/EmptiedFiles.hpp"
 #include "main/files/GitAdapter.hpp"
+#include "main/files/foldersInIndex.hpp"
 #include "util/lock/IndexLock.hpp"
 #include "util/path/PathspecArray.hpp"
 #include "util/repository/repository.hpp"
@@ -94,6 +95,7 @@ void GitAdapter::addToIndex(const std::vector<upath> &files)
     check(git_index_add_all, index.get(), getArrayPointer(pathspec), GIT_INDEX_ADD_DEFAULT,
           acceptAllPaths, this);
     emptied.giveBack(index.get());
+    takeOutBelowFiles(index.get(), pathspec);
     writeIndex(index.get());
     lock.publish();
 }

@@ -339,6 +339,25 @@ TEST_F(AddFiles, RefusesAFileThatWasAFolder)
     expectRefuses({"sub/inside"}, {"sub"});
 }
 
+/// The pattern of such a name does not mean what was below it.
+TEST_F(AddFiles, TakesFilesWhoseNamesNeedAnEscapeAndThatWereFolders)
+{
+    for (const std::string name : {"!a", "sub/line\nend", "what?", "z "})
+    {
+        repository_.write(name + "-beside", "x");
+        repository_.write(name + "/deep/inside", "x");
+        repository_.write(name + "/inside", "x");
+        repository_.commitAll("a folder");
+        repository_.remove(name);
+        repository_.write(name, "x");
+        const RepositoryState expected =
+            stateAfterGit({{"--literal-pathspecs", "add", "--", name}});
+        add({name});
+        EXPECT_EQ(stateOf(repository_), expected) << name;
+        repository_.commit("a file");
+    }
+}
+
 TEST_F(AddFiles, RefusesASubmoduleThatGitKnows)
 {
     auto inner = makeRepository("inner");

@@ -146,6 +146,22 @@ TEST_F(RevertedKinds, MakesFilesAndLinksAgainOfStagedFolders)
     EXPECT_THAT(status(), ElementsAre());
 }
 
+/// The pattern of such a name does not mean what is below.
+TEST_F(RevertedKinds, MakesFilesAgainOfStagedFoldersWhoseNamesNeedAnEscape)
+{
+    for (const std::string name : {"!a", "sub/line\nend", "z "})
+    {
+        repository_.write(name, "x");
+        repository_.commitAll("a file");
+        repository_.remove(name);
+        repository_.write(name + "/a", "x");
+        repository_.write(name + "/deep/b", "x");
+        repository_.add({"."});
+        expectRevertsAsGit({name});
+        EXPECT_THAT(status(), ElementsAre()) << name;
+    }
+}
+
 TEST_F(RevertedKinds, TakesAStagedChangeOfAFileToALinkBack)
 {
     repository_.remove("file");
