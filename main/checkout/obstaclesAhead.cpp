@@ -71,18 +71,22 @@ Finding findMissingFolder(WorkingCopy &copy, const TreeChange &change)
     const bool isMissing = change.before == nullptr && change.after != nullptr &&
                            copy.at(change.path) == Standing::Nothing &&
                            copy.isFolderInHead(change.path);
+    if (!isMissing)
+    {
+        return {};
+    }
     const std::string kind = isGitlink(change.after) ? "submodule" : "file";
-    return isMissing
-               ? Obstacle{change.path, "the folder '" + change.path + "', which becomes a " + kind +
-                                           ", is missing: bring it back with 'git restore "
-                                           "--source=HEAD --staged --worktree' first"}
-               : Finding();
+    return Obstacle{change.path, "the folder '" + change.path + "', which becomes a " + kind +
+                                     ", is missing: bring it back with 'git restore "
+                                     "--source=HEAD --staged --worktree' first"};
 }
 
 Finding findSubmodule(WorkingCopy &copy, const TreeChange &change)
 {
     const bool isReplaced = isGitlink(change.before) && makesFile(change);
-    const bool isInTheWay = isReplaced && copy.holdsFiles(change.path);
+    // Where ours has made it a folder, nothing of a submodule is left.
+    const bool isInTheWay =
+        isReplaced && !copy.isFolderInHead(change.path) && copy.holdsFiles(change.path);
     return isInTheWay ? inTheWay(change.path, Standing::Folder) : Finding();
 }
 

@@ -64,11 +64,12 @@ const std::vector<Place> &submodulePlaces();
 const std::vector<Obstacle> &submoduleObstacles();
 
 /// Where ours, too, has done something to a submodule: on "ours-adds", "ours-moves",
-/// "ours-removes" and "ours-files".
+/// "ours-removes", "ours-files" and "ours-folders".
 const std::vector<Place> &addedSubmodulePlaces();
 const std::vector<Place> &movedSubmodulePlaces();
 const std::vector<Place> &removedSubmodulePlaces();
 const std::vector<Place> &replacedSubmodulePlaces();
+const std::vector<Place> &unfoldedSubmodulePlaces();
 
 /// Makes "copy", a working copy on "main" with submodules, and "source", where these come from.
 /// Each of its branches changes the first and the last file as well, but those that begin with

@@ -37,6 +37,8 @@ struct SubmoduleOperation
     /// Completes what a switch to the branch `start` has left.
     void (*begin)(const GitRepository &copy) = [](const GitRepository &) {};
     bool hasSiblings = false;
+    /// Lets git switch to the branch `start`.
+    void (*clear)(const GitRepository &copy) = [](const GitRepository &) {};
 };
 
 std::ostream &operator<<(std::ostream &stream, const SubmoduleOperation &operation)
@@ -70,6 +72,12 @@ void removeLeftFolders(const GitRepository &copy)
 {
     copy.remove("s");
     copy.remove("t/s");
+}
+
+/// The submodule's own file would be in the way.
+void depopulate(const GitRepository &copy)
+{
+    copy.git({"submodule", "--quiet", "deinit", "s"});
 }
 
 SubmoduleOperation besideSiblings(SubmoduleOperation operation)
@@ -114,6 +122,16 @@ const std::vector<SubmoduleOperation> submoduleOperations{
      1,
      {},
      vclink::test::replacedSubmodulePlaces},
+    {"merge into unfolded submodules",
+     "ours-folders",
+     mergeByGit,
+     mergeInto,
+     1,
+     {},
+     vclink::test::unfoldedSubmodulePlaces,
+     [](const GitRepository &) {},
+     false,
+     depopulate},
     {"fast-forward of submodules",
      "main",
      {"merge", "--quiet", "--ff-only"},
@@ -186,6 +204,7 @@ class BranchesWithSubmodules : public testing::WithParamInterface<SubmoduleOpera
 TEST_P(BranchesWithSubmodules, LoseNothingThatGitKeepsAndOtherwiseDifferByRuleOnly)
 {
     const SubmoduleOperation &operation = GetParam();
+    operation.clear(original());
     go(operation.start);
     operation.begin(original());
     for (const auto &place : operation.places())

@@ -63,6 +63,7 @@ std::map<std::string, Files> filesOfBranches(const Commits &at)
           {"t/new", first},
           {"u/new", first}}},
         {"ours-files", {{"mine", "of ours\n"}, {"s", "ours\n"}}},
+        {"ours-folders", {{"mine", "of ours\n"}, {"s", gone}, {"s/inner", "ours\n"}}},
         {"ours-moves", {{"mine", "of ours\n"}, {"s", third}, {"t/s", third}}},
         {"ours-removes",
          {{"mine", "of ours\n"}, {".gitmodules", gone}, {"s", gone}, {"t/s", gone}}},
@@ -201,6 +202,27 @@ const std::vector<Place> &replacedSubmodulePlaces()
         {"a submodule that they moved", file, common, "s", "moves"},
         {"a submodule that they removed", file, common, "s", "removes"},
         {"a submodule that ours made a file", file, common, "s", "unrelated"},
+    };
+    return places;
+}
+
+const std::vector<Place> &unfoldedSubmodulePlaces()
+{
+    constexpr bool common = true;
+    constexpr bool rare = false;
+    static const std::vector<Place> places{
+        {"a submodule that both made a folder", Holds::folder, common, "s", "folders"},
+        {"below a submodule that both made a folder", Holds::file, rare, "s/inner", "folders"},
+        {"a submodule that they made a file", Holds::folder, common, "s", "files"},
+        {"a submodule that they moved", Holds::folder, common, "s", "moves"},
+        {"below a submodule that they moved", Holds::file, rare, "s/inner", "moves"},
+        {"a submodule that they removed", Holds::folder, common, "s", "removes"},
+        {"below a submodule that they removed", Holds::file, rare, "s/inner", "removes"},
+        {"a submodule that they renamed", Holds::folder, common, "s", "renames"},
+        {"a submodule that ours made a folder", Holds::folder, common, "s", "unrelated"},
+        {"below a submodule that ours made a folder", Holds::file, common, "s/inner", "unrelated"},
+        {"new below a submodule that ours made a folder", Holds::nothing, common, "s/new",
+         "unrelated"},
     };
     return places;
 }

@@ -56,11 +56,30 @@ const std::vector<SurroundingDifference> &surroundingDifferences()
     const Names addedMerge{"merge into added submodules"};
     const Names removedMerge{"merge into removed submodules"};
     const Names replacedMerge{"merge into replaced submodules"};
+    const Names unfoldedMerge{"merge into unfolded submodules"};
     const Names movedOrAdded{"merge into moved submodules", "merge into added submodules"};
     const Names otherKinds{"file in the submodule's place", "link in the submodule's place",
                            "pipe in the submodule's place"};
     static const std::vector<SurroundingDifference> differences{
         // The library refuses, though git goes on.
+        {unfoldedMerge,
+         {"file in the folder's place", "folder missing"},
+         "a submodule that *",
+         conflicts,
+         refusal,
+         "libgit2 merges into no file that has changed; git leaves its conflict beside it"},
+        {unfoldedMerge,
+         {"file in the folder's place"},
+         "a submodule that *",
+         through,
+         refusal,
+         "a merge checks out by force, and would put back what the user has changed"},
+        {unfoldedMerge,
+         {"edit", "folder in its place"},
+         "below a submodule that ours made a folder",
+         through,
+         refusal,
+         "a merge checks out by force, and would put back what the user has changed"},
         {all, missing, "a *", through, refusal,
          "libgit2 takes a missing file that the other side touches for an edit"},
         {merge, missing, "in a folder that becomes a file", through, refusal,
@@ -404,6 +423,18 @@ const std::vector<SurroundingDifference> &surroundingDifferences()
         {merge,
          {"empty folder in its place"},
          "a file left alone*",
+         through,
+         otherwise,
+         "a merge puts back missing files, where there is nothing to lose"},
+        {unfoldedMerge,
+         {"folder missing"},
+         "a submodule that *",
+         through,
+         otherwise,
+         "a merge puts back missing files, where there is nothing to lose"},
+        {unfoldedMerge,
+         {"missing", "empty folder in its place"},
+         "below a submodule that ours made a folder",
          through,
          otherwise,
          "a merge puts back missing files, where there is nothing to lose"},

@@ -209,6 +209,18 @@ TEST_F(SubmoduleObstacles, AreSubmodulesWithFilesThatBecomeAFolder)
 }
 
 /// libgit2 takes the submodule for gone then, and its folder for a new one.
+TEST_F(SubmoduleObstacles, OfAMergeAreNotFoldersThatOursHasMadeOfASubmodule)
+{
+    makeReplacing([this] { repository_.write("module", "theirs\n"); });
+    repository_.git({"rm", "--quiet", "--force", "module"});
+    repository_.write("module/inside", "ours\n");
+    repository_.commitAll("a folder");
+    expectConflicts("topic");
+    EXPECT_EQ(repository_.read("module/inside"), "ours\n");
+    EXPECT_EQ(repository_.git({"show", ":module/inside"}), "ours\n");
+    EXPECT_EQ(repository_.git({"show", ":3:module"}), "theirs\n");
+}
+
 TEST_F(SubmoduleObstacles, OfAMergeAreFoldersBehindASiblingThatSortsBeforeThem)
 {
     repository_.write("module-1", "x");
