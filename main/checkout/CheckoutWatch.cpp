@@ -212,6 +212,7 @@ void CheckoutWatch::lookBeforeMerge(const git_oid *theirs)
         refuse(*first);
     }
     merged_.stage(copy.index());
+    copy.forget();
 }
 
 void CheckoutWatch::settleSubmodules() const
@@ -269,7 +270,7 @@ Finding CheckoutWatch::noteHardLink(const CheckoutNotice &notice)
 {
     const bool makesFile = notice.why == GIT_CHECKOUT_NOTIFY_UPDATED && notice.target != nullptr &&
                            !isGitlink(notice.target);
-    if (!makesFile || hardLinks_.note(root_ + notice.path))
+    if (!makesFile || hardLinks_.note(path_.assign(root_).append(notice.path)))
     {
         return {};
     }
@@ -295,7 +296,7 @@ int CheckoutWatch::hear(const CheckoutNotice &notice)
     // The commands of a merge may have run for minutes since the first look.
     if (!std::exchange(hasHeard_, true))
     {
-        copy_->forgetWays();
+        copy_->forget();
         if (copy_->hasHeadMoved())
         {
             git_error_set_str(GIT_ERROR_REFERENCE, Head::movedText);
@@ -320,9 +321,12 @@ Finding CheckoutWatch::judge(const CheckoutNotice &notice)
 
 void CheckoutWatch::noteUntracked(const CheckoutNotice &notice)
 {
+    if (kind_ != CheckoutKind::Merge || notice.why != GIT_CHECKOUT_NOTIFY_UNTRACKED)
+    {
+        return;
+    }
     std::string name = notice.path;
-    const bool isFolder = !name.empty() && name.back() == '/';
-    if (kind_ == CheckoutKind::Merge && notice.why == GIT_CHECKOUT_NOTIFY_UNTRACKED && isFolder)
+    if (!name.empty() && name.back() == '/')
     {
         name.pop_back();
         merged_.noteUntracked(*copy_, name);
@@ -345,7 +349,7 @@ void CheckoutWatch::makeWay(const CheckoutNotice &notice)
     if (isNew && way.standing == Standing::Link)
     {
         cleared_.remove(root_ + way.blocker);
-        copy_->forgetWays();
+        copy_->forget();
     }
     const Standing standing = copy_->at(name);
     if ((isNew && standing == Standing::Link) || (isPast && standing == Standing::Folder))

@@ -106,6 +106,8 @@ class CheckoutWatch
     std::string replaced_;
     ClearedWay cleared_;
     HardLinks hardLinks_;
+    /// A buffer for what is looked at for each file.
+    std::string path_;
 };
 
 } // namespace vclink::git

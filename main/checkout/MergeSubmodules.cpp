@@ -43,7 +43,7 @@ void MergeSubmodules::stage(git_index *index) const
     }
 }
 
-void MergeSubmodules::noteUntracked(const WorkingCopy &copy, const std::string &name)
+void MergeSubmodules::noteUntracked(WorkingCopy &copy, const std::string &name)
 {
     // If libgit2 continues with a merge, only the content of its result is staged.
     if (isGitlink(copy.entryOf(name)))

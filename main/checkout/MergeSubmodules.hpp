@@ -30,7 +30,7 @@ class MergeSubmodules
 
     /// Examines something that is untracked in the result of the merge.
     /// @param name the name of a folder
-    void noteUntracked(const WorkingCopy &copy, const std::string &name);
+    void noteUntracked(WorkingCopy &copy, const std::string &name);
 
     /// Returns true if there is nothing to do afterwards.
     bool isEmpty() const noexcept;

@@ -61,7 +61,13 @@ bool WorkingCopy::hasHeadMoved() const
 
 Standing WorkingCopy::at(const std::string &name)
 {
-    return wayTo(name).standing == Standing::Folder ? standingAt(root_ + name) : Standing::Nothing;
+    return wayTo(name).standing == Standing::Folder ? standingAt(pathOf(name)) : Standing::Nothing;
+}
+
+const std::string &WorkingCopy::pathOf(const std::string &name)
+{
+    path_.assign(root_).append(name);
+    return path_;
 }
 
 bool WorkingCopy::holdsFiles(const std::string &folder) const
@@ -102,7 +108,19 @@ const WorkingCopy::Way &WorkingCopy::wayTo(const std::string &name)
     {
         return wayToRoot_;
     }
-    const auto known = ways_.find(name.substr(0, end));
+    // Names come in the order of folders.
+    if (wayToFolder_ == nullptr || name.compare(0, end, folder_) != 0)
+    {
+        folder_.assign(name, 0, end);
+        wayToFolder_ = nullptr;
+        wayToFolder_ = &findWay(name);
+    }
+    return *wayToFolder_;
+}
+
+const WorkingCopy::Way &WorkingCopy::findWay(const std::string &name)
+{
+    const auto known = ways_.find(folder_);
     if (known != ways_.end())
     {
         return known->second;
@@ -120,9 +138,11 @@ const WorkingCopy::Way &WorkingCopy::wayTo(const std::string &name)
     return *way;
 }
 
-void WorkingCopy::forgetWays()
+void WorkingCopy::forget()
 {
     ways_.clear();
+    wayToFolder_ = nullptr;
+    asked_.clear();
 }
 
 WorkingCopy::Way WorkingCopy::wayInto(const std::string &folder, const Way &above) const
@@ -147,9 +167,14 @@ WorkingCopy::Way WorkingCopy::wayInto(const std::string &folder, const Way &abov
     return goesFirst ? Way{Standing::Nothing, ""} : Way{standing, folder};
 }
 
-const git_index_entry *WorkingCopy::entryOf(const std::string &name) const
+const git_index_entry *WorkingCopy::entryOf(const std::string &name)
 {
-    return git_index_get_bypath(index_.get(), name.c_str(), 0);
+    if (asked_.empty() || asked_ != name)
+    {
+        entry_ = git_index_get_bypath(index_.get(), name.c_str(), 0);
+        asked_ = name;
+    }
+    return entry_;
 }
 
 bool WorkingCopy::isInHead(const std::string &name) const

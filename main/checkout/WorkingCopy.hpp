@@ -55,10 +55,14 @@ class WorkingCopy
     };
     /// Returns what is above a name. Remembers the folders that it has seen.
     const Way &wayTo(const std::string &name);
-    void forgetWays();
 
-    /// Returns the index's entry, null if there is none without a conflict.
-    const git_index_entry *entryOf(const std::string &name) const;
+    /// Returns the index's entry, null if there is none without a conflict. Remembers the last one,
+    /// since several rules ask for it.
+    const git_index_entry *entryOf(const std::string &name);
+
+    /// Forgets folders and entry. To be called when files or the index may have changed.
+    void forget();
+
     bool isInHead(const std::string &name) const;
     /// Returns true if HEAD has a folder of this name.
     bool isFolderInHead(const std::string &name) const;
@@ -75,7 +79,10 @@ class WorkingCopy
     bool isEdited(const git_index_entry &entry);
 
   private:
+    /// In a buffer that the next call uses again: this runs for each file of a checkout.
+    const std::string &pathOf(const std::string &name);
     git_object_t typeInHead(const std::string &name) const;
+    const Way &findWay(const std::string &name);
     Way wayInto(const std::string &folder, const Way &above) const;
     git_oid idOf(const std::string &name, Standing standing) const;
 
@@ -86,6 +93,13 @@ class WorkingCopy
     OwnedHandle<git_tree> head_;
     const Way wayToRoot_{};
     std::unordered_map<std::string, Way> ways_;
+    /// The folder that was looked at last, and the way to it; null for none.
+    std::string folder_;
+    const Way *wayToFolder_ = nullptr;
+    /// The name whose entry was asked for last; empty for none.
+    std::string asked_;
+    const git_index_entry *entry_ = nullptr;
+    std::string path_;
 };
 
 } // namespace vclink::git

@@ -75,8 +75,10 @@ GitResult<OwnedHandle<git_object>> lookUpWritten(git_repository *repository, con
 void GitAdapter::commit(const upath & /*folder*/, const ustring &message)
 {
     const OwnedHandle<git_repository> repository = openRepository(root_);
-    // From here no other process commits, merges or ends a merge in this working copy.
-    IndexLock lock(repository.get());
+    // From here no other process commits, merges or ends a merge in this working copy. The index of
+    // a merge was written just now.
+    IndexLock lock(repository.get(),
+                   expectedMerge_ != nullptr ? IndexTime::Fraction : IndexTime::Second);
     // If HEAD has no commit, for any reason, the new commit is a root commit.
     const GitResult<OwnedHandle<git_commit>> head = lookupCommitByName("HEAD", repository.get());
     std::vector<OwnedHandle<git_commit>> mergeHeads;
@@ -143,6 +145,10 @@ void GitAdapter::createCommit(git_repository *repository, const ustring &message
     const OwnedHandle<git_signature> signature = makeSignature(repository);
     const OwnedHandle<git_index> index = getRepositoryIndex(repository);
     refreshForCommit(repository, index.get(), head, parents);
+    if (expectedMerge_ != nullptr)
+    {
+        markSavedSince(repository, index.get());
+    }
     writeIndex(index.get());
     // For libgit2 it ends at the first NUL.
     const std::string text = fl::i18n::ustring_to_utf8(message);

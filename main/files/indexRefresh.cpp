@@ -3,6 +3,8 @@
 
 #include <cerrno>
 #include <cstddef>
+#include <cstdint>
+#include <ctime>
 #include <string>
 
 #include <fcntl.h>
@@ -88,6 +90,12 @@ void refuseUnreadable(const std::string &workdir, const std::string &path)
     }
 }
 
+bool isOfTime(const git_index_entry &entry, const timespec &time)
+{
+    return entry.mtime.seconds == time.tv_sec &&
+           entry.mtime.nanoseconds == static_cast<std::uint32_t>(time.tv_nsec);
+}
+
 void restoreDropped(git_repository *repository, git_index *index, git_index *before)
 {
     const std::string workdir = git_repository_workdir(repository);
@@ -121,6 +129,37 @@ void refreshIndex(git_repository *repository, git_index *index)
     {
         const OwnedHandle<git_index> before = openIndex(git_index_path(index));
         restoreDropped(repository, index, before.get());
+    }
+}
+
+void markSavedSince(git_repository *repository, git_index *index)
+{
+    struct stat ofIndex = {};
+    if (stat(git_index_path(index), &ofIndex) != 0)
+    {
+        return;
+    }
+    std::string path = git_repository_workdir(repository);
+    const std::size_t rootSize = path.size();
+    const std::size_t count = git_index_entrycount(index);
+    for (std::size_t i = 0; i < count; ++i)
+    {
+        const git_index_entry *const entry = git_index_get_byindex(index, i);
+        const bool isOfThatSecond = entry->mtime.seconds >= ofIndex.st_mtim.tv_sec;
+        if (!isOfThatSecond || entry->mode == GIT_FILEMODE_COMMIT)
+        {
+            continue;
+        }
+        path.replace(rootSize, std::string::npos, entry->path);
+        struct stat ofFile = {};
+        if (lstat(path.c_str(), &ofFile) == 0 && !isOfTime(*entry, ofFile.st_mtim))
+        {
+            // As git and libgit2 mark a file to be compared by its content.
+            git_index_entry marked = *entry;
+            marked.path = path.c_str() + rootSize;
+            marked.file_size = 0;
+            check(git_index_add, index, &marked);
+        }
     }
 }
 

@@ -13,4 +13,10 @@ namespace vclink::git
 /// be written
 void refreshIndex(git_repository *repository, git_index *index);
 
+/// Marks in the index, in memory, the files that were saved since the refresh in the second in
+/// which the index was written. git, which ignores fractions, would treat them as unchanged. For an
+/// index that is locked with IndexTime::Fraction; to be called right before it is written.
+/// @throws LibGit2Exception
+void markSavedSince(git_repository *repository, git_index *index);
+
 } // namespace vclink::git

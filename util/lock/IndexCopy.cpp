@@ -61,7 +61,7 @@ IndexCopy::IndexCopy(std::string index, std::string path)
 {
 }
 
-IndexCopy::IndexCopy(const std::string &index) : IndexCopy(index, index + ".vclink")
+IndexCopy::IndexCopy(const std::string &index, IndexTime time) : IndexCopy(index, index + ".vclink")
 {
     removeIfThere(path_);
     // The lock that libgit2 uses to write the copy.
@@ -69,7 +69,7 @@ IndexCopy::IndexCopy(const std::string &index) : IndexCopy(index, index + ".vcli
     const FileDescriptor source(::open(index_.c_str(), O_RDONLY | O_CLOEXEC));
     if (source)
     {
-        copyFrom(source);
+        copyFrom(source, time);
     }
     else if (errno != ENOENT)
     {
@@ -82,7 +82,7 @@ IndexCopy::~IndexCopy()
     ::unlink(path_.c_str());
 }
 
-void IndexCopy::copyFrom(const FileDescriptor &source)
+void IndexCopy::copyFrom(const FileDescriptor &source, IndexTime time)
 {
     struct stat status = {};
     if (::fstat(source.get(), &status) != 0)
@@ -96,8 +96,9 @@ void IndexCopy::copyFrom(const FileDescriptor &source)
         raiseUncopied(errno, path_);
     }
     copyContent(source, static_cast<std::size_t>(status.st_size));
+    const long fraction = time == IndexTime::Fraction ? status.st_mtim.tv_nsec : 0;
     const std::array<timespec, 2> times{timespec{0, UTIME_OMIT},
-                                        timespec{status.st_mtim.tv_sec, 0}};
+                                        timespec{status.st_mtim.tv_sec, fraction}};
     if (::futimens(copy_.get(), times.data()) != 0 || ::fstat(copy_.get(), &copied_) != 0)
     {
         raiseUncopied(errno, path_);

@@ -18,7 +18,6 @@
 #include "error/errorUtil/GitResult.hpp"
 #include "error/errorUtil/raiseGitError.hpp"
 #include "error/errorUtil/raiseSystemError.hpp"
-#include "util/lock/IndexCopy.hpp"
 #include "util/repository/repository.hpp"
 #include "util/scope/FileDescriptor.hpp"
 
@@ -116,7 +115,8 @@ class IndexLock::LockFile
 class IndexLock::Held
 {
   public:
-    explicit Held(std::string index) : path(std::move(index)), lock(path + ".lock"), copy(path)
+    Held(std::string index, IndexTime time)
+        : path(std::move(index)), lock(path + ".lock"), copy(path, time)
     {
     }
 
@@ -125,8 +125,8 @@ class IndexLock::Held
     const IndexCopy copy;
 };
 
-IndexLock::IndexLock(git_repository *repository)
-    : held_(std::make_unique<Held>(findIndex(repository)))
+IndexLock::IndexLock(git_repository *repository, IndexTime time)
+    : held_(std::make_unique<Held>(findIndex(repository), time))
 {
     const OwnedHandle<git_index> index = openIndex(held_->copy.path().c_str());
     check(git_repository_set_index, repository, index.get());

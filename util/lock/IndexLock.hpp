@@ -5,6 +5,8 @@
 
 #include <git2/types.h>
 
+#include "util/lock/IndexCopy.hpp"
+
 namespace vclink::git
 {
 
@@ -22,7 +24,8 @@ class IndexLock
     /// @param repository outlives the object; must not use its index after publish()
     /// @throws LibGit2Exception with the code GIT_ELOCKED and the name of the lock file if
     /// something else holds the lock; then nothing has changed
-    [[nodiscard]] explicit IndexLock(git_repository *repository);
+    [[nodiscard]] explicit IndexLock(git_repository *repository,
+                                     IndexTime time = IndexTime::Second);
     IndexLock(const IndexLock &) = delete;
     IndexLock &operator=(const IndexLock &) = delete;
     /// Publishes what libgit2 wrote and releases the lock, so that what was written before a
