@@ -76,12 +76,27 @@ template <class Call> std::optional<std::string> attempt(Call call)
     }
 }
 
+/// What Boost's relative path was before 1.81, which the library keeps to: a separator at the end
+/// is left out if the path exists, and "." follows it otherwise.
+std::string likeEarlierBoost(std::string relative, const std::string &path)
+{
+    if (relative.empty() || relative.back() != '/')
+        return relative;
+    boost::system::error_code ignored;
+    if (boost::filesystem::exists(path, ignored))
+        relative.pop_back();
+    else
+        relative += '.';
+    return relative;
+}
+
 /// @return the path below the root; empty when it can't be told or is none
 std::string checkRelative(const std::string &root, const std::string &path)
 {
     const auto relative = attempt(
         [&] { return ustring_to_utf8(vclink::git::relativeToRoot(asPath(root), asPath(path))); });
-    auto plain = attempt([&] { return boost::filesystem::relative(path, root).string(); });
+    auto plain = attempt(
+        [&] { return likeEarlierBoost(boost::filesystem::relative(path, root).string(), path); });
     if (plain)
         std::replace(plain->begin(), plain->end(), '\\', '/');
     require(relative == plain, "a path is what it is relative to the root");
