@@ -172,6 +172,8 @@ std::vector<DriverCase> sideCases()
         sides("MovedByOursExecutableByTheirs", base,
               both(moves("file", "new"), writes("new", lines("ours"))),
               both(theirs, sets("file", 0755))),
+        sides("ExecutableByOursMovedByTheirs", base, both(ours, sets("file", 0755)),
+              both(moves("file", "new"), writes("new", lines("theirs")))),
         sides("RemovedByOurs", base, removes("file"), theirs),
         sides("RemovedByTheirs", base, ours, removes("file")),
         // git gives the command an empty ancestor.

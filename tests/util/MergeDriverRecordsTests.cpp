@@ -56,23 +56,19 @@ TEST_F(MergeDriverRecords, TellOfASuccess)
                                      "8 Auto-merge successful", "64 " + signature));
 }
 
-TEST_F(MergeDriverRecords, TellOfARefusal)
+TEST_F(MergeDriverRecords, TellOfARefusalAndOfANameWithoutACommand)
 {
     makeConflict();
+    EXPECT_THAT(allRecords(),
+                ElementsAre("32 " + signature, "2  filter_name=tool",
+                            "512 Merge driver merge.tool.driver not found", "64 " + signature));
+    repository_.git({"reset", "--quiet", "--hard"});
     const std::string program = scripts_.shell("exit 1");
     define("tool", program);
     EXPECT_THAT(allRecords(),
                 ElementsAre("32 " + signature, "2  filter_name=tool",
                             "8 merge.tool.driver " + program, "8 Command: " + program,
                             "8 Output:\n", "8 Auto-merge unsuccessful", "64 " + signature));
-}
-
-TEST_F(MergeDriverRecords, TellOfANameWithoutACommand)
-{
-    makeConflict("absent");
-    EXPECT_THAT(allRecords(),
-                ElementsAre("32 " + signature, "2  filter_name=absent",
-                            "512 Merge driver merge.absent.driver not found", "64 " + signature));
 }
 
 TEST_F(MergeDriverRecords, TellTheNameAsConfigurationSpellsIt)
@@ -160,22 +156,17 @@ TEST_F(MergeDriverRecords, TellOfTemporaryFilesThatCannotBeRemovedTheLastOneFirs
     EXPECT_TRUE(isInConflict("file"));
 }
 
-TEST_F(MergeDriverRecords, TellNothingOfTemporaryFilesThatAreGone)
+TEST_F(MergeDriverRecords, TellNothingOfTemporaryFilesThatAreGoneOrOfSeveritiesThatAreNotEnabled)
 {
     makeConflict();
     defineScript("tool", "rm \"$1\" \"$2\" \"$3\"");
-    const LogCapture log(0x210);
-    EXPECT_EQ(merge(), 0);
-    EXPECT_THAT(log.messages(), IsEmpty());
-}
-
-TEST_F(MergeDriverRecords, AreNotMadeForSeveritiesThatAreNotEnabled)
-{
-    makeConflict();
-    defineScript("tool", "exit 1");
-    const LogCapture log(0);
-    EXPECT_EQ(merge(), 0);
-    EXPECT_THAT(log.messages(), IsEmpty());
+    for (const unsigned severities : {0x210u, 0u})
+    {
+        const LogCapture log(severities);
+        EXPECT_EQ(merge(), 0);
+        EXPECT_THAT(log.messages(), IsEmpty());
+        repository_.git({"reset", "--quiet", "--hard"});
+    }
 }
 
 } // namespace

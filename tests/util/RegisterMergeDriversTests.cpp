@@ -26,25 +26,25 @@ class RegisterMergeDrivers : public vclink::test::GitFixture
     vclink::test::LibGit2Session session_{environment()};
 };
 
-TEST_F(RegisterMergeDrivers, RegistersOneDriverUnderTheWildcard)
+TEST_F(RegisterMergeDrivers, RegistersOneDriverUnderTheWildcardWithoutAWord)
 {
     EXPECT_EQ(git_merge_driver_lookup("*"), nullptr);
+    const LogCapture log;
     git::GitMergeDriverLookup lookup = git::registerMergeDrivers();
+    EXPECT_THAT(log.messages(), IsEmpty());
     ASSERT_EQ(lookup.size(), 1U);
     EXPECT_EQ(lookup.begin()->first, "*");
-    EXPECT_EQ(git_merge_driver_lookup("*"), &lookup.at("*"));
-    git::unregisterMergeDrivers(lookup);
-}
-
-TEST_F(RegisterMergeDrivers, FillsTheRecord)
-{
-    git::GitMergeDriverLookup lookup = git::registerMergeDrivers();
     const git_merge_driver &driver = lookup.at("*");
+    EXPECT_EQ(git_merge_driver_lookup("*"), &driver);
     EXPECT_EQ(driver.version, 1U);
     EXPECT_EQ(driver.initialize, nullptr);
     EXPECT_EQ(driver.shutdown, nullptr);
     EXPECT_EQ(driver.apply, &git::wildcardApplyEntry);
     git::unregisterMergeDrivers(lookup);
+    EXPECT_EQ(git_merge_driver_lookup("*"), nullptr);
+    // The lookup stays as it is.
+    EXPECT_EQ(lookup.size(), 1U);
+    EXPECT_EQ(lookup.at("*").apply, &git::wildcardApplyEntry);
 }
 
 TEST_F(RegisterMergeDrivers, KeepsTheRecordsAddressWhenTheLookupIsMoved)
@@ -60,31 +60,16 @@ TEST_F(RegisterMergeDrivers, KeepsTheRecordsAddressWhenTheLookupIsMoved)
     git::unregisterMergeDrivers(constructed);
 }
 
-TEST_F(RegisterMergeDrivers, LeavesTheFirstRegistrationWhenThereIsOne)
+TEST_F(RegisterMergeDrivers, LeavesTheFirstRegistrationAndEndsEachWithAnyLookup)
 {
     git::GitMergeDriverLookup first = git::registerMergeDrivers();
     git::GitMergeDriverLookup second = git::registerMergeDrivers();
     EXPECT_EQ(second.size(), 1U);
     EXPECT_EQ(git_merge_driver_lookup("*"), &first.at("*"));
-    git::unregisterMergeDrivers(first);
-}
-
-TEST_F(RegisterMergeDrivers, EndsEveryRegistrationWithAnyLookup)
-{
-    git::GitMergeDriverLookup first = git::registerMergeDrivers();
-    git::GitMergeDriverLookup second = git::registerMergeDrivers();
     git::unregisterMergeDrivers(second);
     EXPECT_EQ(git_merge_driver_lookup("*"), nullptr);
     git::unregisterMergeDrivers(first);
     EXPECT_EQ(git_merge_driver_lookup("*"), nullptr);
-}
-
-TEST_F(RegisterMergeDrivers, LeavesTheLookupAsItIsAtTheEnd)
-{
-    git::GitMergeDriverLookup lookup = git::registerMergeDrivers();
-    git::unregisterMergeDrivers(lookup);
-    EXPECT_EQ(lookup.size(), 1U);
-    EXPECT_EQ(lookup.at("*").apply, &git::wildcardApplyEntry);
 }
 
 TEST_F(RegisterMergeDrivers, TellsOfEachDriverAtTheEndInTheOrderOfTheirNames)
@@ -98,14 +83,6 @@ TEST_F(RegisterMergeDrivers, TellsOfEachDriverAtTheEndInTheOrderOfTheirNames)
                 ElementsAre("Unregister merge driver: *", "Unregister merge driver: a",
                             "Unregister merge driver: b"));
     EXPECT_EQ(log.records().at(0).severity, 0x08U);
-}
-
-TEST_F(RegisterMergeDrivers, TellsNothingOfTheRegistration)
-{
-    const LogCapture log;
-    git::GitMergeDriverLookup lookup = git::registerMergeDrivers();
-    EXPECT_THAT(log.messages(), IsEmpty());
-    git::unregisterMergeDrivers(lookup);
 }
 
 } // namespace

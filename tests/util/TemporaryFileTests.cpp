@@ -2,6 +2,7 @@
 #include <csignal>
 #include <cstdlib>
 #include <filesystem>
+#include <set>
 #include <stdexcept>
 #include <string>
 
@@ -44,27 +45,19 @@ class TemporaryFile : public vclink::test::GitFixture
     }
 };
 
-TEST_F(TemporaryFile, HoldsTheBytes)
+TEST_F(TemporaryFile, HoldsTheBytesInTheTemporaryFolderUnderANewNameForItsOwnerAlone)
 {
+    std::set<std::string> names;
     for (const std::string &bytes : {std::string(), std::string("text\r\n"),
                                      std::string("\0\377\n", 3), std::string(1'000'000, 'x')})
-        EXPECT_EQ(Scripts::read(write(bytes)), bytes);
-}
-
-TEST_F(TemporaryFile, StandsInTheTemporaryFolderUnderANewName)
-{
-    const fs::path first = write("1");
-    const fs::path second = write("2");
-    EXPECT_EQ(first.parent_path(), environment().temporary());
-    EXPECT_EQ(second.parent_path(), environment().temporary());
-    EXPECT_NE(first, second);
-    EXPECT_EQ(first.extension(), "");
-}
-
-TEST_F(TemporaryFile, IsItsOwnersAlone)
-{
-    const std::string file = write("secret");
-    EXPECT_EQ(fs::status(file).permissions(), fs::perms(0600));
+    {
+        const fs::path file = write(bytes);
+        EXPECT_EQ(Scripts::read(file), bytes);
+        EXPECT_EQ(file.parent_path(), environment().temporary());
+        EXPECT_EQ(file.extension(), "");
+        EXPECT_EQ(fs::status(file).permissions(), fs::perms(0600));
+        EXPECT_TRUE(names.insert(file).second);
+    }
 }
 
 TEST_F(TemporaryFile, HasANameEvenWhenItCannotBeWritten)
@@ -88,7 +81,7 @@ TEST_F(TemporaryFile, KeepsQuietAboutBytesThatDoNotFit)
     EXPECT_LE(fs::file_size(file), 1000U);
 }
 
-TEST_F(TemporaryFile, HoldsABlob)
+TEST_F(TemporaryFile, HoldsABlobAndIsNotMadeForOneThatIsMissing)
 {
     const vclink::test::LibGit2Session session(environment());
     auto repository = makeRepository();
@@ -100,16 +93,8 @@ TEST_F(TemporaryFile, HoldsABlob)
     git_oid_fromstr(&entry.id, repository.line({"rev-parse", "HEAD:file"}).c_str());
     const upath file = git::writeBlobToTemporaryFile(entry, opened.get());
     EXPECT_EQ(Scripts::read(asBytes(file)), std::string("a\r\n\0b", 5));
-}
-
-TEST_F(TemporaryFile, IsNotMadeForABlobThatIsMissing)
-{
-    const vclink::test::LibGit2Session session(environment());
-    const auto repository = makeRepository();
-    const auto opened =
-        git::acquire<git_repository>(git_repository_open, repository.path().c_str()).value();
+    git::removeTemporaryFile(file);
     const vclink::test::NothingLeft check(environment().temporary());
-    git_index_entry entry = {};
     git_oid_fromstr(&entry.id, std::string(40, '1').c_str());
     EXPECT_EQ(vclink::test::failureOf(
                   [&] { static_cast<void>(git::writeBlobToTemporaryFile(entry, opened.get())); })
@@ -117,17 +102,13 @@ TEST_F(TemporaryFile, IsNotMadeForABlobThatIsMissing)
               GIT_ENOTFOUND);
 }
 
-TEST_F(TemporaryFile, IsRemoved)
+TEST_F(TemporaryFile, IsRemovedOrMayBeGoneAlreadyWithoutAWord)
 {
+    const LogCapture log;
     const std::string file = write("bytes");
     git::removeTemporaryFile(asPath(file));
     EXPECT_FALSE(fs::exists(file));
-}
-
-TEST_F(TemporaryFile, MayBeGoneAlreadyWithoutAWord)
-{
-    const LogCapture log;
-    git::removeTemporaryFile(asPath(folder() / "missing"));
+    git::removeTemporaryFile(asPath(file));
     EXPECT_THAT(log.messages(), IsEmpty());
 }
 
@@ -135,7 +116,7 @@ TEST_F(TemporaryFile, ThatCannotBeRemovedIsToldOfAndLeft)
 {
     const std::string file = folder() / "full";
     fs::create_directories(file + "/sub");
-    const LogCapture log;
+    LogCapture log;
     git::removeTemporaryFile(asPath(file));
     ASSERT_EQ(log.records().size(), 2U);
     EXPECT_EQ(log.records()[0].severity, 0x10U);
@@ -144,13 +125,8 @@ TEST_F(TemporaryFile, ThatCannotBeRemovedIsToldOfAndLeft)
     EXPECT_EQ(log.records()[1].severity, 0x200U);
     EXPECT_EQ(log.records()[1].message, "Could not remove temporary file: " + file);
     EXPECT_TRUE(fs::exists(file));
-}
-
-TEST_F(TemporaryFile, IsRemovedWithoutAnExceptionEvenWhenTheLogRaises)
-{
-    const std::string file = folder() / "full";
-    fs::create_directories(file + "/sub");
-    LogCapture log;
+    // Without an exception even when the log raises one.
+    log.clear();
     log.onRecord([](const LogRecord &) { throw std::runtime_error("sink"); });
     git::removeTemporaryFile(asPath(file));
     EXPECT_EQ(log.records().size(), 1U);

@@ -14,61 +14,34 @@ namespace
 
 using vclink::test::AllocationCounter;
 
-TEST(AllocationCounter, CountsEachAllocationWithItsBytes)
+TEST(AllocationCounter, CountsEachAllocationThatComesAfterItWithItsBytes)
 {
+    constexpr std::align_val_t alignment{64};
     const AllocationCounter counter;
+    EXPECT_EQ(counter.count(), 0u);
+    EXPECT_EQ(counter.bytes(), 0u);
     auto *const one = ::operator new(100);
     auto *const two = ::operator new[](28);
     EXPECT_EQ(counter.count(), 2u);
     EXPECT_EQ(counter.bytes(), 128u);
+    const AllocationCounter inner;
+    auto *const aligned = ::operator new(10, alignment);
+    EXPECT_EQ(reinterpret_cast<std::uintptr_t>(aligned) % 64, 0u);
+    EXPECT_EQ(counter.count(), 3u);
+    EXPECT_EQ(inner.count(), 1u);
+    EXPECT_EQ(inner.bytes(), 10u);
     ::operator delete(one);
     ::operator delete[](two);
+    ::operator delete(aligned, alignment);
 }
 
-TEST(AllocationCounter, SeesNothingWhereNothingIsAllocated)
-{
-    std::string text(100, 'x');
-    const AllocationCounter counter;
-    text.back() = 'y';
-    EXPECT_EQ(counter.count(), 0u);
-    EXPECT_EQ(counter.bytes(), 0u);
-}
-
-TEST(AllocationCounter, CountsAlignedAllocations)
-{
-    constexpr std::align_val_t alignment{64};
-    const AllocationCounter counter;
-    auto *const memory = ::operator new(10, alignment);
-    EXPECT_EQ(reinterpret_cast<std::uintptr_t>(memory) % 64, 0u);
-    EXPECT_EQ(counter.count(), 1u);
-    EXPECT_EQ(counter.bytes(), 10u);
-    ::operator delete(memory, alignment);
-}
-
-TEST(AllocationCounter, SeesOnlyWhatComesAfterIt)
-{
-    const AllocationCounter outer;
-    auto *const one = ::operator new(10);
-    const AllocationCounter inner;
-    auto *const two = ::operator new(10);
-    EXPECT_EQ(outer.count(), 2u);
-    EXPECT_EQ(inner.count(), 1u);
-    ::operator delete(one);
-    ::operator delete(two);
-}
-
-TEST(AllocationCounter, CountsInsideSharedLibraries)
+TEST(AllocationCounter, CountsInsideSharedLibrariesAndOtherThreads)
 {
     const std::string bytes(1000, 'x');
     const AllocationCounter counter;
     const auto text = fl::i18n::utf8_to_ustring(bytes);
     EXPECT_GE(counter.count(), 1u);
     EXPECT_GE(counter.bytes(), text.size() * sizeof(char16_t));
-}
-
-TEST(AllocationCounter, CountsTheAllocationsOfOtherThreads)
-{
-    const AllocationCounter counter;
     std::thread([] { ::operator delete(::operator new(5000)); }).join();
     EXPECT_GE(counter.bytes(), 5000u);
 }

@@ -17,62 +17,37 @@ namespace
 using vclink::test::Command;
 using namespace std::chrono_literals;
 
-TEST(Command, KeepsTheStreamsApart)
+TEST(Command, TellsTheStreamsApartTheExitStatusAndTheSignal)
 {
-    const auto result = Command({"sh", "-c", "echo out; echo err >&2"}).run();
-    EXPECT_EQ(result.output, "out\n");
-    EXPECT_EQ(result.errors, "err\n");
-    EXPECT_TRUE(result.succeeded());
+    const auto good = Command({"sh", "-c", "echo out; echo err >&2"}).run();
+    EXPECT_EQ(good.output, "out\n");
+    EXPECT_EQ(good.errors, "err\n");
+    EXPECT_TRUE(good.succeeded());
+    const auto failed = Command({"sh", "-c", "exit 3"}).run();
+    EXPECT_EQ(failed.exitStatus, 3);
+    EXPECT_EQ(failed.signal, 0);
+    EXPECT_FALSE(failed.succeeded());
+    const auto killed = Command({"sh", "-c", "kill -TERM $$"}).run();
+    EXPECT_EQ(killed.signal, SIGTERM);
+    EXPECT_EQ(killed.exitStatus, -1);
+    EXPECT_FALSE(killed.succeeded());
 }
 
-TEST(Command, TellsTheExitStatus)
-{
-    const auto result = Command({"sh", "-c", "exit 3"}).run();
-    EXPECT_EQ(result.exitStatus, 3);
-    EXPECT_EQ(result.signal, 0);
-    EXPECT_FALSE(result.succeeded());
-}
-
-TEST(Command, TellsTheSignalThatEndedTheProgram)
-{
-    const auto result = Command({"sh", "-c", "kill -TERM $$"}).run();
-    EXPECT_EQ(result.signal, SIGTERM);
-    EXPECT_EQ(result.exitStatus, -1);
-    EXPECT_FALSE(result.succeeded());
-}
-
-TEST(Command, HandsOverArgumentsAsTheyAre)
+TEST(Command, HandsArgumentsInputVariablesAndFolderOverAsTheyAre)
 {
     const std::string odd = "a b\"c'$HOME\\\n\xff";
     EXPECT_EQ(Command({"printf", "%s", odd}).run().output, odd);
-}
-
-TEST(Command, CarriesEveryByteThroughTheStandardStreams)
-{
     std::string bytes;
     for (int index = 0; index < 300'000; ++index)
         bytes.push_back(static_cast<char>(index * 7 % 256));
     EXPECT_EQ(Command({"cat"}).input(bytes).run().output, bytes);
-}
-
-TEST(Command, ReadsNothingUnlessGiven)
-{
-    const auto result = Command({"cat"}).run();
-    EXPECT_TRUE(result.succeeded());
-    EXPECT_EQ(result.output, "");
-}
-
-TEST(Command, SetsAndRemovesVariables)
-{
-    const auto result = Command({"sh", "-c", "echo \"$VCLINK_ONE-${HOME-unset}\""})
-                            .environment("VCLINK_ONE", "1")
-                            .withoutEnvironment("HOME")
-                            .run();
-    EXPECT_EQ(result.output, "1-unset\n");
-}
-
-TEST(Command, RunsInTheGivenFolder)
-{
+    EXPECT_EQ(Command({"cat"}).run().output, "");
+    EXPECT_EQ(Command({"sh", "-c", "echo \"$VCLINK_ONE-${HOME-unset}\""})
+                  .environment("VCLINK_ONE", "1")
+                  .withoutEnvironment("HOME")
+                  .run()
+                  .output,
+              "1-unset\n");
     const vclink::test::TemporaryFolder folder;
     EXPECT_EQ(Command({"pwd", "-P"}).in(folder.path()).run().output, folder.path().string() + "\n");
 }
@@ -99,21 +74,12 @@ TEST(Command, DoesNotWaitForAChildThatTheProgramLeavesBehind)
     EXPECT_LT(std::chrono::steady_clock::now() - start, 3s);
 }
 
-TEST(Command, RaisesWhenTheProgramIsMissing)
-{
-    EXPECT_THROW(Command({"vclink-no-such-program"}).run(), std::system_error);
-}
-
-TEST(Command, RaisesWhenTheFolderIsMissing)
-{
-    EXPECT_THROW(Command({"true"}).in("/nonexistent").run(), std::system_error);
-}
-
-TEST(Command, LeavesNoDescriptorOpen)
+TEST(Command, RaisesWhenTheProgramOrTheFolderIsMissingAndLeavesNoDescriptorOpen)
 {
     const vclink::test::NoDescriptorLeak check;
     EXPECT_TRUE(Command({"true"}).run().succeeded());
     EXPECT_THROW(Command({"vclink-no-such-program"}).run(), std::system_error);
+    EXPECT_THROW(Command({"true"}).in("/nonexistent").run(), std::system_error);
 }
 
 } // namespace

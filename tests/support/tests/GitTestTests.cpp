@@ -37,25 +37,13 @@ class GitRepositoryTest : public vclink::test::GitFixture
 {
 };
 
-TEST_F(GitRepositoryTest, BeginsEmptyOnTheBranchMain)
+TEST_F(GitRepositoryTest, BeginsAsGitInitMakesItAndNotOverAnother)
 {
     const auto repository = makeRepository();
     EXPECT_EQ(repository.path(), folder() / "repository");
-    EXPECT_EQ(repository.line({"symbolic-ref", "HEAD"}), "refs/heads/main");
-    EXPECT_EQ(repository.git({"status", "--porcelain"}), "");
-}
-
-TEST_F(GitRepositoryTest, BeginsAsGitInitMakesIt)
-{
-    const auto repository = makeRepository();
     const auto made = folder() / "made";
     repository.git({"init", "--quiet", "--template=", "--initial-branch=main", made.string()});
     EXPECT_EQ(filesBelow(repository.path()), filesBelow(made));
-}
-
-TEST_F(GitRepositoryTest, DoesNotBeginOverAnother)
-{
-    const auto repository = makeRepository();
     EXPECT_THROW(makeRepository(), std::runtime_error);
 }
 
@@ -84,28 +72,22 @@ TEST_F(GitRepositoryTest, MakesRemovesLinksAndSetsModes)
     EXPECT_THROW(repository.remove("a"), std::runtime_error);
 }
 
-TEST_F(GitRepositoryTest, StagesNamesAsTheyAreAndNotAsPatterns)
+TEST_F(GitRepositoryTest, StagesNamesAsTheyAreAndNotAsPatternsAndRemovals)
 {
-    const auto repository = makeRepository();
+    auto repository = makeRepository();
     for (const auto *name : {"a1", "a[1]", "#x", "!y"})
         repository.write(name, "x");
     repository.add({"a[1]", "#x"});
     EXPECT_EQ(repository.git({"ls-files"}), "#x\na[1]\n");
     repository.add();
     EXPECT_EQ(repository.git({"ls-files"}), "!y\n#x\na1\na[1]\n");
+    repository.commit("first");
+    repository.remove("a1");
+    repository.add({"a1"});
+    EXPECT_EQ(repository.git({"status", "--porcelain"}), "D  a1\n");
 }
 
-TEST_F(GitRepositoryTest, StagesTheRemovalOfAName)
-{
-    auto repository = makeRepository();
-    repository.write("file", "x");
-    repository.commitAll("first");
-    repository.remove("file");
-    repository.add({"file"});
-    EXPECT_EQ(repository.git({"status", "--porcelain"}), "D  file\n");
-}
-
-TEST_F(GitRepositoryTest, CommitsTheSameIdsEveryTime)
+TEST_F(GitRepositoryTest, CommitsTheSameIdsEveryTimeWithoutLeavingAnIdentityAndClones)
 {
     auto one = makeRepository("one");
     auto two = makeRepository("two");
@@ -115,6 +97,11 @@ TEST_F(GitRepositoryTest, CommitsTheSameIdsEveryTime)
     EXPECT_EQ(id.size(), 40u);
     EXPECT_EQ(two.commitAll("first"), id);
     EXPECT_NE(one.commit("second"), id);
+    EXPECT_EQ(two.line({"log", "--format=%an <%ae>"}), "Test Author <author@example.com>");
+    EXPECT_FALSE(two.tryGit({"config", "user.name"}).succeeded());
+    const auto copy = GitRepository::clone(two.path(), folder() / "copy");
+    EXPECT_EQ(copy.read("file"), "text");
+    EXPECT_EQ(copy.line({"rev-parse", "HEAD"}), id);
 }
 
 TEST_F(GitRepositoryTest, TellsTheIdOfACommitOnABranchOnNoneAndInALinkedWorkingCopy)
@@ -133,24 +120,6 @@ TEST_F(GitRepositoryTest, TellsTheIdOfACommitOnABranchOnNoneAndInALinkedWorkingC
     expectIdOfHead(repository);
     repository.git({"worktree", "add", "--quiet", folder() / "linked"});
     expectIdOfHead(GitRepository(folder() / "linked"));
-}
-
-TEST_F(GitRepositoryTest, CommitsWithoutLeavingAnIdentity)
-{
-    auto repository = makeRepository();
-    repository.commit("first");
-    EXPECT_EQ(repository.line({"log", "--format=%an <%ae>"}), "Test Author <author@example.com>");
-    EXPECT_FALSE(repository.tryGit({"config", "user.name"}).succeeded());
-}
-
-TEST_F(GitRepositoryTest, ClonesAnother)
-{
-    auto source = makeRepository("source");
-    source.write("file", "text");
-    const auto id = source.commitAll("first");
-    const auto copy = GitRepository::clone(source.path(), folder() / "copy");
-    EXPECT_EQ(copy.read("file"), "text");
-    EXPECT_EQ(copy.line({"rev-parse", "HEAD"}), id);
 }
 
 TEST_F(GitRepositoryTest, RaisesWithTheWordsOfGit)

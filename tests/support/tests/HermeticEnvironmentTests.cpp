@@ -102,28 +102,21 @@ TEST(HermeticEnvironment, LeavesLibGit2WithoutTheCertificatesOfTheMachine)
     EXPECT_NE(read(nullptr, "/nonexistent"), 0);
 }
 
-TEST(HermeticEnvironment, IsWhatALaterStartOfLibGit2Finds)
+TEST(HermeticEnvironment, IsWhatALaterStartOfLibGit2FindsAndIsToldToOneThatRunsAlready)
 {
-    for (const std::string value : {"first", "second"})
+    for (const bool runs : {false, true})
     {
-        const TemporaryFolder folder;
-        const HermeticEnvironment environment(folder.path());
-        writeGlobalConfiguration(environment, value);
-        git_libgit2_init();
-        EXPECT_EQ(readConfiguration("vclink.key"), value);
-        git_libgit2_shutdown();
-    }
-}
-
-TEST(HermeticEnvironment, IsToldToALibGit2ThatRunsAlready)
-{
-    git_libgit2_init();
-    for (const std::string value : {"first", "second"})
-    {
-        const TemporaryFolder folder;
-        const HermeticEnvironment environment(folder.path());
-        writeGlobalConfiguration(environment, value);
-        EXPECT_EQ(readConfiguration("vclink.key"), value);
+        if (runs)
+            git_libgit2_init();
+        for (const std::string value : {"first", "second"})
+        {
+            const TemporaryFolder folder;
+            const HermeticEnvironment environment(folder.path());
+            writeGlobalConfiguration(environment, value);
+            git_libgit2_init();
+            EXPECT_EQ(readConfiguration("vclink.key"), value);
+            git_libgit2_shutdown();
+        }
     }
     EXPECT_EQ(git_libgit2_shutdown(), 0) << "the environment has kept libgit2 running";
 }

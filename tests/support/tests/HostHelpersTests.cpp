@@ -50,23 +50,21 @@ TEST(LogCapture, CollectsTheRecordsOfItsLoggerInOrder)
     EXPECT_THAT(capture.messages(0x04), ElementsAre("second"));
 }
 
-TEST(LogCapture, ForgetsWhatItIsToldToForget)
+TEST(LogCapture, TellsOfEachRecordForgetsOnRequestAndPutsBackTheSeverities)
 {
-    Logger logger("vclink::test::cleared");
-    LogCapture capture(0x02, "vclink::test::cleared");
-    write(logger, 0x02, "first");
-    capture.clear();
-    write(logger, 0x02, "second");
-    EXPECT_THAT(capture.messages(), ElementsAre("second"));
-}
-
-TEST(LogCapture, PutsBackTheSeverities)
-{
-    Logger logger("vclink::test::restored");
-    vclink_host::setEnabledSeverities("vclink::test::restored", 0x10);
+    Logger logger("vclink::test::told");
+    vclink_host::setEnabledSeverities("vclink::test::told", 0x10);
     {
-        const LogCapture capture(0x02, "vclink::test::restored");
+        LogCapture capture(0x02, "vclink::test::told");
         EXPECT_EQ(logger.enabled_severities(), 0x02u);
+        write(logger, 0x02, "first");
+        capture.clear();
+        std::vector<std::string> told;
+        capture.onRecord([&told](const vclink::test::LogRecord &record)
+                         { told.push_back(record.message); });
+        write(logger, 0x02, "second");
+        EXPECT_THAT(told, ElementsAre("second"));
+        EXPECT_THAT(capture.messages(), ElementsAre("second"));
     }
     EXPECT_EQ(logger.enabled_severities(), 0x10u);
 }
@@ -80,29 +78,13 @@ TEST(Text, GoesBothWaysWithoutLoss)
     EXPECT_THAT(vclink::test::asPaths({"a", "b"}), ElementsAre(upath(u"a"), upath(u"b")));
 }
 
-TEST(TestInteractor, PassesOnARequestToCancel)
+TEST(TestInteractor, PassesOnARequestToCancelAndWhatIsRaisedAndRemembersProgress)
 {
     vclink::test::TestInteractor interactor;
     vclink::PollableTerminator poller(interactor.getTerminator());
     EXPECT_FALSE(poller.checkAndResetCancelledState());
     interactor.cancel();
     EXPECT_TRUE(poller.checkAndResetCancelledState());
-}
-
-TEST(TestInteractor, RemembersProgress)
-{
-    vclink::test::TestInteractor interactor;
-    interactor.getProgressReporter()->setProgress(0.5);
-    interactor.getProgressReporter()->setProgressMessage(u"half");
-    EXPECT_THAT(interactor.progress.fractions, ElementsAre(0.5));
-    EXPECT_THAT(interactor.progress.messages, ElementsAre(ustring(u"half")));
-    EXPECT_THAT(interactor.progress.calls,
-                ElementsAre(ProgressCall(0.5), ProgressCall(ustring(u"half"))));
-}
-
-TEST(TestInteractor, TellsTheNumberOfEachCallAndPassesOnWhatIsRaised)
-{
-    vclink::test::TestInteractor interactor;
     std::vector<std::size_t> numbers;
     interactor.progress.onCall = [&numbers](std::size_t number)
     {
@@ -110,23 +92,14 @@ TEST(TestInteractor, TellsTheNumberOfEachCallAndPassesOnWhatIsRaised)
         if (number == 2)
             throw number;
     };
-    interactor.progress.setProgress(0.0);
-    EXPECT_THROW(interactor.progress.setProgressMessage(u"half"), std::size_t);
-    interactor.progress.setProgress(1.0);
+    interactor.getProgressReporter()->setProgress(0.5);
+    EXPECT_THROW(interactor.getProgressReporter()->setProgressMessage(u"half"), std::size_t);
+    interactor.getProgressReporter()->setProgress(1.0);
     EXPECT_THAT(numbers, ElementsAre(1u, 2u, 3u));
-    EXPECT_EQ(interactor.progress.calls.size(), 3u);
-}
-
-TEST(LogCapture, TellsOfEachRecordWhenItComes)
-{
-    Logger logger("vclink::test::told");
-    LogCapture capture(0x02, "vclink::test::told");
-    std::vector<std::string> told;
-    capture.onRecord([&told](const vclink::test::LogRecord &record)
-                     { told.push_back(record.message); });
-    write(logger, 0x02, "one");
-    EXPECT_THAT(told, ElementsAre("one"));
-    EXPECT_THAT(capture.messages(), ElementsAre("one"));
+    EXPECT_THAT(interactor.progress.fractions, ElementsAre(0.5, 1.0));
+    EXPECT_THAT(interactor.progress.messages, ElementsAre(ustring(u"half")));
+    EXPECT_THAT(interactor.progress.calls,
+                ElementsAre(ProgressCall(0.5), ProgressCall(ustring(u"half")), ProgressCall(1.0)));
 }
 
 } // namespace

@@ -4,8 +4,10 @@
 #include <cstdlib>
 #include <filesystem>
 #include <fstream>
+#include <functional>
 #include <stdexcept>
 #include <string>
+#include <utility>
 
 #include <fcntl.h>
 #include <gtest/gtest-spi.h>
@@ -24,27 +26,21 @@ using vclink::test::openDescriptors;
 using vclink::test::runAsUnprivilegedUser;
 using namespace std::chrono_literals;
 
-TEST(OpenDescriptors, TellWhatIsOpen)
-{
-    const auto before = openDescriptors();
-    const int descriptor = ::open("/dev/null", O_RDONLY | O_CLOEXEC);
-    auto expected = before;
-    expected[descriptor] = "/dev/null";
-    EXPECT_EQ(openDescriptors(), expected);
-    ::close(descriptor);
-    EXPECT_EQ(openDescriptors(), before);
-}
-
 TEST(NoDescriptorLeak, FailsTheTestThatLeavesOneOpen)
 {
     static int descriptor = -1;
+    const auto before = openDescriptors();
     EXPECT_NONFATAL_FAILURE(
         {
             const NoDescriptorLeak check;
             descriptor = ::open("/dev/null", O_RDONLY | O_CLOEXEC);
         },
         "descriptors have changed");
+    auto expected = before;
+    expected[descriptor] = "/dev/null";
+    EXPECT_EQ(openDescriptors(), expected);
     ::close(descriptor);
+    EXPECT_EQ(openDescriptors(), before);
 }
 
 TEST(UnprivilegedUser, IsRefusedWhatRootIsNot)
@@ -57,24 +53,19 @@ TEST(UnprivilegedUser, IsRefusedWhatRootIsNot)
     EXPECT_EQ(answer, "");
 }
 
-TEST(UnprivilegedUser, CannotTakeThePrivilegesBack)
+TEST(UnprivilegedUser, CannotTakeThePrivilegesBackAndIsInNoGroupOfRoots)
 {
+    const int groups = vclink::test::runsAsRoot() ? 0 : ::getgroups(0, nullptr);
     const auto answer = runAsUnprivilegedUser(
-        []() -> std::string
+        [groups]() -> std::string
         {
             if (::getuid() == 0 || ::geteuid() == 0 || ::getegid() == 0)
                 return "it is privileged";
+            if (::getgroups(0, nullptr) != groups)
+                return "it is in a group of root's";
             return ::setuid(0) == 0 || ::setgid(0) == 0 ? "it became privileged again" : "";
         });
     EXPECT_EQ(answer, "");
-}
-
-TEST(UnprivilegedUser, IsInNoGroupOfRoots)
-{
-    const int expected = vclink::test::runsAsRoot() ? 0 : ::getgroups(0, nullptr);
-    const auto answer =
-        runAsUnprivilegedUser([] { return std::to_string(::getgroups(0, nullptr)); });
-    EXPECT_EQ(answer, std::to_string(expected));
 }
 
 TEST(UnprivilegedUser, MayBeGivenATree)
@@ -94,31 +85,17 @@ TEST(UnprivilegedUser, MayBeGivenATree)
     EXPECT_EQ(answer, "");
 }
 
-TEST(UnprivilegedUser, AnswersWithTheActionsText)
+TEST(UnprivilegedUser, AnswersWithTheTextOfTheActionOrItsExceptionOrHowTheChildEnded)
 {
-    EXPECT_EQ(runAsUnprivilegedUser([] { return std::string(200'000, 'x'); }),
-              std::string(200'000, 'x'));
-}
-
-TEST(UnprivilegedUser, AnswersWithTheTextOfAnException)
-{
-    EXPECT_EQ(runAsUnprivilegedUser([]() -> std::string { throw std::runtime_error("why"); }),
-              "exception: why");
-    EXPECT_EQ(runAsUnprivilegedUser([]() -> std::string { throw 1; }),
-              "exception of a type that has no text");
-}
-
-TEST(UnprivilegedUser, TellsHowAChildEndedThatDidNotAnswer)
-{
-    EXPECT_EQ(runAsUnprivilegedUser([]() -> std::string { ::_exit(3); }),
-              "the child process ended early, with status 3");
-    EXPECT_EQ(runAsUnprivilegedUser(
-                  []() -> std::string
-                  {
-                      ::raise(SIGKILL);
-                      return "";
-                  }),
-              "the child process ended by signal 9");
+    const NoDescriptorLeak check;
+    const std::pair<std::function<std::string()>, std::string> rows[] = {
+        {[] { return std::string(200'000, 'x'); }, std::string(200'000, 'x')},
+        {[]() -> std::string { throw std::runtime_error("why"); }, "exception: why"},
+        {[]() -> std::string { throw 1; }, "exception of a type that has no text"},
+        {[]() -> std::string { ::_exit(3); }, "the child process ended early, with status 3"},
+        {[] { return std::to_string(::raise(SIGKILL)); }, "the child process ended by signal 9"}};
+    for (const auto &[action, answer] : rows)
+        EXPECT_EQ(runAsUnprivilegedUser(action), answer);
 }
 
 TEST(UnprivilegedUser, WaitsNoLongerThanAllowed)
@@ -144,12 +121,6 @@ TEST(UnprivilegedUser, LeavesTheParentsExitHandlersAlone)
     std::filesystem::permissions(folder.path(), std::filesystem::perms(01777));
     EXPECT_EQ(runAsUnprivilegedUser([] { return std::string(); }), "");
     EXPECT_FALSE(std::filesystem::exists(folder / "mark"));
-}
-
-TEST(UnprivilegedUser, LeavesNoDescriptorOpen)
-{
-    const NoDescriptorLeak check;
-    EXPECT_EQ(runAsUnprivilegedUser([] { return std::string("answer"); }), "answer");
 }
 
 } // namespace

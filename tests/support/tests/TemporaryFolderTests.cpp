@@ -1,7 +1,6 @@
 // SPDX-License-Identifier: MIT
 #include <filesystem>
 #include <fstream>
-#include <memory>
 #include <string>
 
 #include <gtest/gtest.h>
@@ -15,22 +14,19 @@ namespace
 namespace fs = std::filesystem;
 using vclink::test::TemporaryFolder;
 
-TEST(TemporaryFolder, IsEmptyAndOneOfItsOwn)
+TEST(TemporaryFolder, IsEmptyAndOneOfItsOwnAndGoesWithAllItHolds)
 {
-    const TemporaryFolder first;
-    const TemporaryFolder second;
-    EXPECT_TRUE(fs::is_empty(first.path()));
-    EXPECT_NE(first.path(), second.path());
-    EXPECT_EQ(first / "name", first.path() / "name");
-}
-
-TEST(TemporaryFolder, GoesWithAllItHolds)
-{
-    auto folder = std::make_unique<TemporaryFolder>();
-    const auto path = folder->path();
-    fs::create_directories(path / "a/b/c");
-    std::ofstream(path / "a/b/file") << "text";
-    folder.reset();
+    const TemporaryFolder other;
+    fs::path path;
+    {
+        const TemporaryFolder folder;
+        path = folder.path();
+        EXPECT_TRUE(fs::is_empty(path));
+        EXPECT_NE(path, other.path());
+        EXPECT_EQ(folder / "name", path / "name");
+        fs::create_directories(path / "a/b/c");
+        std::ofstream(path / "a/b/file") << "text";
+    }
     EXPECT_FALSE(fs::exists(path));
 }
 

@@ -107,7 +107,7 @@ TEST(ChildStatus, IsTheNumberOfTheSignal)
     }
 }
 
-TEST(ChildStatus, TellsWhetherTheChildRuns)
+TEST(ChildStatus, TellsWhetherTheChildRunsAndLeavesItToItsOwner)
 {
     Child child(exitWith(3));
     ChildStatus status(child.process());
@@ -117,26 +117,10 @@ TEST(ChildStatus, TellsWhetherTheChildRuns)
     child.letGo();
     EXPECT_EQ(status.wait(error), 3);
     EXPECT_FALSE(status.isRunning(error));
-    EXPECT_FALSE(error);
-}
-
-TEST(ChildStatus, LeavesTheChildToItsOwner)
-{
-    Child child(exitWith(3));
-    EXPECT_EQ(waitFor(child), 3);
     const int taken = child.take();
     EXPECT_TRUE(WIFEXITED(taken));
     EXPECT_EQ(WEXITSTATUS(taken), 3);
-}
-
-TEST(ChildStatus, StaysKnownWhenAnotherTakesItAfterTheLook)
-{
-    Child child(exitWith(3));
-    ChildStatus status(child.process());
-    child.letGo();
-    std::error_code error;
-    EXPECT_EQ(status.wait(error), 3);
-    child.take();
+    // It stays known.
     EXPECT_EQ(status.wait(error), 3);
     EXPECT_FALSE(status.isRunning(error));
     EXPECT_FALSE(error);

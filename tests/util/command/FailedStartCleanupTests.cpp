@@ -82,62 +82,52 @@ TEST_F(FailedStartCleanupTest, ClosesTheWritingEndWhenNothingHasStarted)
     EXPECT_TRUE(isOpen(source()));
 }
 
-TEST_F(FailedStartCleanupTest, LeavesANumberThatIsAnotherFilesByThen)
+TEST_F(FailedStartCleanupTest, LeavesAnEndThatIsClosedOrANumberThatIsAnotherFilesOrPipesByThen)
 {
+    const auto expectLeaves = [](const auto &change)
     {
-        const FailedStartCleanup guard(source(), sink());
-        ::close(sink());
-        const int other = ::open("/dev/null", O_RDONLY | O_CLOEXEC);
-        EXPECT_EQ(other, sink());
-    }
-    EXPECT_TRUE(isOpen(sink()));
-}
-
-TEST_F(FailedStartCleanupTest, LeavesANumberThatIsAnotherPipesByThen)
-{
+        std::array<int, 2> ends{-1, -1};
+        EXPECT_EQ(::pipe2(ends.data(), O_CLOEXEC), 0);
+        std::optional<FailedStartCleanup> guard(std::in_place, ends[0], ends[1]);
+        ::close(ends[1]);
+        change(ends[1]);
+        const bool wasOpen = isOpen(ends[1]);
+        guard.reset();
+        EXPECT_EQ(isOpen(ends[1]), wasOpen);
+        EXPECT_TRUE(isOpen(ends[0]));
+        ::close(ends[0]);
+        ::close(ends[1]);
+    };
+    expectLeaves([](int) {});
+    expectLeaves([](int writing)
+                 { EXPECT_EQ(::open("/dev/null", O_RDONLY | O_CLOEXEC), writing); });
     std::array<int, 2> other{-1, -1};
-    {
-        const FailedStartCleanup guard(source(), sink());
-        ::close(sink());
-        EXPECT_EQ(::pipe2(other.data(), O_CLOEXEC), 0);
-        EXPECT_EQ(other[0], sink());
-    }
-    EXPECT_TRUE(isOpen(other[0]));
+    expectLeaves(
+        [&other](int writing)
+        {
+            EXPECT_EQ(::pipe2(other.data(), O_CLOEXEC), 0);
+            EXPECT_EQ(other[0], writing);
+        });
     EXPECT_TRUE(isOpen(other[1]));
     ::close(other[1]);
 }
 
-TEST_F(FailedStartCleanupTest, LeavesAnEndThatIsClosedAlready)
+TEST_F(FailedStartCleanupTest, WaitsForTheChildThatCouldNotBecomeTheCommandHoweverLate)
 {
+    for (const int milliseconds : {0, 20})
     {
-        const FailedStartCleanup guard(source(), sink());
-        ::close(sink());
+        {
+            const FailedStartCleanup guard(source(), sink());
+            const pid_t child = ::fork();
+            if (child == 0)
+            {
+                ::poll(nullptr, 0, milliseconds);
+                ::_exit(EXIT_FAILURE);
+            }
+            EXPECT_TRUE(hasChildren());
+        }
+        EXPECT_FALSE(hasChildren());
     }
-    EXPECT_FALSE(isOpen(sink()));
-    EXPECT_TRUE(isOpen(source()));
-}
-
-TEST_F(FailedStartCleanupTest, WaitsForTheChildThatCouldNotBecomeTheCommand)
-{
-    {
-        const FailedStartCleanup guard(source(), sink());
-        makeChild(EXIT_FAILURE);
-        EXPECT_TRUE(hasChildren());
-    }
-    EXPECT_FALSE(hasChildren());
-}
-
-TEST_F(FailedStartCleanupTest, LeavesTheChildrenThatWereThereBefore)
-{
-    const pid_t earlier = makeChild(EXIT_FAILURE);
-    awaitEnd(earlier);
-    {
-        const FailedStartCleanup guard(source(), sink());
-        makeChild(EXIT_FAILURE);
-    }
-    int status = 0;
-    EXPECT_EQ(::waitpid(earlier, &status, WNOHANG), earlier);
-    EXPECT_EQ(WEXITSTATUS(status), EXIT_FAILURE);
 }
 
 TEST_F(FailedStartCleanupTest, LeavesChildrenThatCouldNotBeListedBefore)
@@ -167,21 +157,7 @@ TEST_F(FailedStartCleanupTest, LeavesChildrenThatCannotBeListedAfterwards)
     EXPECT_EQ(::waitpid(child, nullptr, 0), child);
 }
 
-TEST_F(FailedStartCleanupTest, WaitsForAChildThatTakesItsTimeToEnd)
-{
-    {
-        const FailedStartCleanup guard(source(), sink());
-        const pid_t child = ::fork();
-        if (child == 0)
-        {
-            ::poll(nullptr, 0, 20);
-            ::_exit(EXIT_FAILURE);
-        }
-    }
-    EXPECT_FALSE(hasChildren());
-}
-
-TEST_F(FailedStartCleanupTest, ListsAnyNumberOfChildren)
+TEST_F(FailedStartCleanupTest, LeavesAnyNumberOfChildrenThatWereThereBefore)
 {
     std::vector<pid_t> earlier;
     // Their list is longer than one reading of it.
@@ -196,8 +172,10 @@ TEST_F(FailedStartCleanupTest, ListsAnyNumberOfChildren)
         last = makeChild(EXIT_FAILURE);
     }
     EXPECT_EQ(::waitpid(last, nullptr, WNOHANG), -1);
+    int status = 0;
     for (const pid_t child : earlier)
-        EXPECT_EQ(::waitpid(child, nullptr, WNOHANG), child);
+        EXPECT_EQ(::waitpid(child, &status, WNOHANG), child);
+    EXPECT_EQ(WEXITSTATUS(status), EXIT_FAILURE);
 }
 
 TEST_F(FailedStartCleanupTest, LeavesAChildThatEndsInAnotherWay)

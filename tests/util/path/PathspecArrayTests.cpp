@@ -29,21 +29,27 @@ using vclink::git::PathspecArray;
 using vclink::test::asPath;
 using Names = std::set<std::string>;
 
+static_assert(!std::is_copy_constructible_v<PathspecArray> &&
+              !std::is_move_constructible_v<PathspecArray> &&
+              !std::is_copy_assignable_v<PathspecArray> &&
+              !std::is_move_assignable_v<PathspecArray>);
+
 std::vector<std::string> texts(const PathspecArray &pathspec)
 {
     const git_strarray array = getArray(pathspec);
     return {array.strings, array.strings + array.count};
 }
 
-TEST(PathspecArray, IsNullAndZeroForAnEmptyList)
+void expectEmpty(const PathspecArray &pathspec)
 {
-    const PathspecArray pathspec({});
     EXPECT_EQ(pathspec.array().strings, nullptr);
     EXPECT_EQ(pathspec.array().count, 0U);
 }
 
-TEST(PathspecArray, HoldsTheStringsInOrder)
+TEST(PathspecArray, HoldsTheStringsInOrderAndIsNullAndZeroForAnEmptyList)
 {
+    expectEmpty(PathspecArray({}));
+    expectEmpty(makeStringPathspec({}));
     const PathspecArray pathspec({"b", "a", "", "a", std::string(100, 'x')});
     EXPECT_THAT(texts(pathspec), ElementsAre("b", "a", "", "a", std::string(100, 'x')));
 }
@@ -58,30 +64,16 @@ TEST(PathspecArray, TakesTheStringsOverWithoutCopying)
     EXPECT_EQ(pathspec.array().strings[1], data[1]);
 }
 
-TEST(PathspecArray, PointsAtTheCharactersItOwns)
+TEST(PathspecArray, PointsAtTheCharactersItOwnsAndGivesItsRecordByAddressAndByValue)
 {
     const PathspecArray pathspec({"one", "two"});
     const auto begin = reinterpret_cast<std::uintptr_t>(&pathspec);
     const auto *record = &pathspec.array();
     EXPECT_EQ(reinterpret_cast<std::uintptr_t>(record) - begin, sizeof(pathspec) - sizeof(*record));
-    pathspec.array().strings[0][0] = 'O';
+    EXPECT_EQ(getArrayPointer(pathspec), record);
+    EXPECT_EQ(getArray(pathspec).strings, record->strings);
+    record->strings[0][0] = 'O';
     EXPECT_THAT(texts(pathspec), ElementsAre("One", "two"));
-}
-
-TEST(PathspecArray, CanNeitherBeCopiedNorMoved)
-{
-    EXPECT_FALSE(std::is_copy_constructible_v<PathspecArray>);
-    EXPECT_FALSE(std::is_move_constructible_v<PathspecArray>);
-    EXPECT_FALSE(std::is_copy_assignable_v<PathspecArray>);
-    EXPECT_FALSE(std::is_move_assignable_v<PathspecArray>);
-}
-
-TEST(PathspecArray, GivesItsRecordByAddressAndByValue)
-{
-    const PathspecArray pathspec({"one", "two"});
-    EXPECT_EQ(getArrayPointer(pathspec), &pathspec.array());
-    EXPECT_EQ(getArray(pathspec).strings, pathspec.array().strings);
-    EXPECT_EQ(getArray(pathspec).count, 2U);
 }
 
 TEST(StringPathspec, LeavesTheTextsUntouched)
@@ -91,13 +83,6 @@ TEST(StringPathspec, LeavesTheTextsUntouched)
                             u"", u"../gr\u00FC"});
     EXPECT_THAT(texts(pathspec), ElementsAre("+refs/heads/*:refs/remotes/o/*", "#a", "!a", "a ",
                                              "\\x", ".", "", "../gr\xC3\xBC"));
-}
-
-TEST(StringPathspec, IsNullAndZeroForAnEmptyList)
-{
-    const PathspecArray pathspec = makeStringPathspec({});
-    EXPECT_EQ(pathspec.array().strings, nullptr);
-    EXPECT_EQ(pathspec.array().count, 0U);
 }
 
 class FilePathspec : public vclink::test::GitFixture
@@ -112,29 +97,21 @@ class FilePathspec : public vclink::test::GitFixture
     }
 };
 
-TEST_F(FilePathspec, HasOneEntryAFileInTheListsOrder)
-{
-    EXPECT_THAT(patterns({"z", "sub/a", "z", "m\xC3\xBC", "\xFF"}),
-                ElementsAre("z", "sub/a", "z", "m\xC3\xBC", "\xFF"));
-}
-
 TEST_F(FilePathspec, IsNullAndZeroForAnEmptyListEvenWhereTheRootCannotBeResolved)
 {
     const vclink::test::GitRepository files(folder().path());
     files.symlink("loop", "loop");
-    const PathspecArray pathspec = makeFilePathspec({}, asPath(folder() / "loop"));
-    EXPECT_EQ(pathspec.array().strings, nullptr);
-    EXPECT_EQ(pathspec.array().count, 0U);
+    expectEmpty(makeFilePathspec({}, asPath(folder() / "loop")));
 }
 
-TEST_F(FilePathspec, LeavesWildcardCharactersAsTheyAre)
+TEST_F(FilePathspec, HasOneEntryAFileInTheListsOrder)
 {
+    EXPECT_THAT(patterns({"z", "sub/a", "z", "m\xC3\xBC", "\xFF"}),
+                ElementsAre("z", "sub/a", "z", "m\xC3\xBC", "\xFF"));
+    // Wildcard characters as they are.
     EXPECT_THAT(patterns({"*.txt", "a?", "a[1]", "**", "x\\*"}),
                 ElementsAre("*.txt", "a?", "a[1]", "**", "x/*"));
-}
-
-TEST_F(FilePathspec, GivesLeadingDotsForAFileOutside)
-{
+    // Leading dots for a file outside.
     EXPECT_THAT(patterns({"../x", "home/../../y/z"}), ElementsAre("../x", "../y/z"));
 }
 
@@ -161,14 +138,10 @@ class FolderPathspec : public vclink::test::GitFixture
     vclink::test::GitRepository repository_ = makeRepository();
 };
 
-TEST_F(FolderPathspec, IsOneStarForTheRoot)
+TEST_F(FolderPathspec, IsOneStarForTheRootAlsoReachedThroughALink)
 {
     for (const auto *name : {"repository", "repository/", "repository/.", "repository/x/.."})
         EXPECT_EQ(pattern(name), "*") << name;
-}
-
-TEST_F(FolderPathspec, IsOneStarForTheRootReachedThroughALink)
-{
     const vclink::test::GitRepository files(folder().path());
     files.symlink("repository", "link");
     EXPECT_EQ(pattern("link"), "*");
@@ -176,23 +149,19 @@ TEST_F(FolderPathspec, IsOneStarForTheRootReachedThroughALink)
     EXPECT_EQ(pattern("link/sub", "link"), "sub/*");
 }
 
-TEST_F(FolderPathspec, IsTheFolderWithAStarBehindIt)
+TEST_F(FolderPathspec, IsTheFolderWithAStarBehindItAndWildcardCharactersAsTheyAre)
 {
     EXPECT_EQ(pattern("repository/sub/dir"), "sub/dir/*");
     repository_.makeFolder("sub/dir");
     EXPECT_EQ(pattern("repository/sub/dir"), "sub/dir/*");
     EXPECT_EQ(pattern("repository/sub/../sub/dir"), "sub/dir/*");
+    EXPECT_EQ(pattern("repository/a*/b[1]"), "a*/b[1]/*");
 }
 
 TEST_F(FolderPathspec, IsRaisedOnALoopOfLinks)
 {
     repository_.symlink("loop", "loop");
     EXPECT_THROW(pattern("repository/loop"), boost::filesystem::filesystem_error);
-}
-
-TEST_F(FolderPathspec, LeavesWildcardCharactersAsTheyAre)
-{
-    EXPECT_EQ(pattern("repository/a*/b[1]"), "a*/b[1]/*");
 }
 
 TEST_F(FolderPathspec, MeansAllBelowTheFolderAndNothingElse)

@@ -68,65 +68,49 @@ class PathspecEscape : public vclink::test::GitFixture
     vclink::test::LibGit2Session session_{environment()};
 };
 
-TEST_F(PathspecEscape, LeavesAPlainNameAsItIs)
+TEST_F(PathspecEscape, LeavesPlainNamesWildcardsAndDangerousCharactersWhereTheyAreHarmless)
 {
-    for (const auto *name : {"a", "sub/dir/file.txt", "a#b", "a!b", "a b", " a", "sub /a", "\r\ta",
-                             "gr\xC3\xBC\xC3\x9F", "\xFF", "", "a\\b"})
+    for (const auto *name : {"a",      "sub/dir/file.txt",
+                             "a#b",    "a!b",
+                             "a b",    " a",
+                             "sub /a", "\r\ta",
+                             "",       "gr\xC3\xBC\xC3\x9F",
+                             "\xFF",   "a\\b",
+                             "*",      "a*b",
+                             "a?",     "[a]",
+                             "[!a]",   "**/x",
+                             "a/#b",   "a/!b",
+                             "a /b",   "a\t/b",
+                             "x\ry"})
         EXPECT_EQ(escapePathspec(name), name);
 }
 
-TEST_F(PathspecEscape, LeavesWildcardCharactersAsTheyAre)
-{
-    for (const auto *name : {"*", "a*b", "a?", "[a]", "[!a]", "**/x"})
-        EXPECT_EQ(escapePathspec(name), name);
-}
-
-TEST_F(PathspecEscape, LeavesDangerousCharactersAloneWhereTheyAreHarmless)
-{
-    for (const auto *name : {"a/#b", "a/!b", "a /b", "a\t/b", "x\ry"})
-        EXPECT_EQ(escapePathspec(name), name);
-}
-
-TEST_F(PathspecEscape, MeansExactlyTheOneFile)
+TEST_F(PathspecEscape, MeansExactlyTheFilesOfAList)
 {
     const auto repository = makeTree(hardNames);
-    for (const auto &name : hardNames)
-        expectMeansExactly(repository, {name});
-}
-
-TEST_F(PathspecEscape, MeansExactlyTheTwoFilesOfAList)
-{
-    const auto repository = makeTree(hardNames);
-    for (std::size_t i = 0; i + 1 < hardNames.size(); ++i)
-        expectMeansExactly(repository, {hardNames[i], hardNames[i + 1]});
-}
-
-TEST_F(PathspecEscape, MeansEveryFileOfALongList)
-{
-    const auto repository = makeTree(hardNames);
-    expectMeansExactly(repository, hardNames);
     std::vector<std::string> everySecond;
-    for (std::size_t i = 0; i < hardNames.size(); i += 2)
-        everySecond.push_back(hardNames[i]);
+    for (std::size_t i = 0; i < hardNames.size(); ++i)
+    {
+        expectMeansExactly(repository, {hardNames[i]});
+        if (i + 1 < hardNames.size())
+            expectMeansExactly(repository, {hardNames[i], hardNames[i + 1]});
+        if (i % 2 == 0)
+            everySecond.push_back(hardNames[i]);
+    }
+    expectMeansExactly(repository, hardNames);
     expectMeansExactly(repository, everySecond);
 }
 
-/// All of a list's patterns begin alike here, and libgit2 looks only below the common beginning.
-TEST_F(PathspecEscape, MeansTheFilesOfAListThatAllBeginDangerously)
+TEST_F(PathspecEscape, MeansTheFilesOfAListThatAllBeginDangerouslyOrDifferOnlyAtTheEnd)
 {
-    const auto repository = makeTree({"#a", "!b", "#ab", "!a", "a", "b", "\\#a", "x"});
-    expectMeansExactly(repository, {"#a", "!b"});
-    expectMeansExactly(repository, {"!b", "#a"});
-    expectMeansExactly(repository, {"#a", "#ab"});
-    expectMeansExactly(repository, {"!a", "!b"});
-}
-
-TEST_F(PathspecEscape, MeansTheFilesOfAListThatDifferOnlyAtTheEnd)
-{
-    const auto repository = makeTree({"same", "same ", "same\n", "same\r", "same\t", "same#"});
-    expectMeansExactly(repository, {"same ", "same\n"});
-    expectMeansExactly(repository, {"same\r", "same\t"});
-    expectMeansExactly(repository, {"same", "same "});
+    const auto repository = makeTree({"#a", "!b", "#ab", "!a", "a", "b", "\\#a", "x", "same",
+                                      "same ", "same\n", "same\r", "same\t", "same#"});
+    // All patterns of a list begin alike here, and libgit2 looks only below the common beginning.
+    const std::vector<std::string> lists[] = {
+        {"#a", "!b"},        {"!b", "#a"},         {"#a", "#ab"},    {"!a", "!b"},
+        {"same ", "same\n"}, {"same\r", "same\t"}, {"same", "same "}};
+    for (const auto &list : lists)
+        expectMeansExactly(repository, list);
 }
 
 TEST_F(PathspecEscape, MeansADangerousNameInASubfolder)
@@ -202,15 +186,11 @@ class ExactPathspec : public PathspecEscape
     }
 };
 
-TEST_F(ExactPathspec, LeavesAPlainNameAsItIs)
+TEST_F(ExactPathspec, ReplacesOnlyWhatMeansSomethingElse)
 {
     for (const auto *name : {"a", "sub/dir/file.txt", "a#b", "a!b", "a b", " a", "sub /a", "a]",
                              "gr\xC3\xBC\xC3\x9F", "\xFF", ""})
         EXPECT_EQ(escapeExactPathspec(name), name);
-}
-
-TEST_F(ExactPathspec, ReplacesOnlyWhatMeansSomethingElse)
-{
     EXPECT_EQ(escapeExactPathspec("a*b"), "a[^//\x01-)+-\xFF]b");
     EXPECT_EQ(escapeExactPathspec("[x]"), "[^//\x01-Z\\\\-\xFF]x]");
     EXPECT_EQ(escapeExactPathspec("#a#"), "[^//\x01-\"$-\xFF]"

@@ -36,84 +36,53 @@ class RepositoryHelpers : public vclink::test::GitFixture
     vclink::test::LibGit2Session session_{environment()};
 };
 
-TEST_F(RepositoryHelpers, OpenTheRepositoryOfTheFolder)
+TEST_F(RepositoryHelpers, OpenANewHandleOfTheFoldersRepositoryEachTimeAndNothingAboveIt)
 {
     const auto repository = makeRepository("gr\xC3\xBC\xC3\x9F \xFF");
-    const auto opened = open(repository);
-    EXPECT_EQ(git_repository_workdir(opened.get()), repository.path().string() + "/");
-    EXPECT_EQ(git_repository_is_bare(opened.get()), 0);
-}
-
-TEST_F(RepositoryHelpers, OpenNothingAboveTheFolder)
-{
-    const auto repository = makeRepository();
     repository.makeFolder("sub");
-    const auto error =
-        failureOf([&] { static_cast<void>(git::openRepository(asPath(repository / "sub"))); });
-    EXPECT_EQ(error.code, GIT_ENOTFOUND);
-    EXPECT_EQ(error.errorClass, GIT_ERROR_REPOSITORY);
-    EXPECT_NE(error.text.find("could not find repository"), std::string::npos);
-}
-
-TEST_F(RepositoryHelpers, OpenANewHandleEachTimeAndCloseIt)
-{
-    const auto repository = makeRepository();
     open(repository);
     const vclink::test::NoDescriptorLeak noLeak;
     const auto first = open(repository);
     const auto second = open(repository);
     EXPECT_NE(first.get(), second.get());
-    EXPECT_EQ(
-        failureOf([&] { static_cast<void>(git::openRepository(asPath(folder() / "missing"))); })
-            .code,
-        GIT_ENOTFOUND);
+    EXPECT_EQ(git_repository_workdir(first.get()), repository.path().string() + "/");
+    EXPECT_EQ(git_repository_is_bare(first.get()), 0);
+    const auto failureToOpen = [&](const std::string &name) {
+        return failureOf([&]
+                         { static_cast<void>(git::openRepository(asPath(repository / name))); });
+    };
+    EXPECT_EQ(failureToOpen("missing").code, GIT_ENOTFOUND);
+    const auto error = failureToOpen("sub");
+    EXPECT_EQ(error.code, GIT_ENOTFOUND);
+    EXPECT_EQ(error.errorClass, GIT_ERROR_REPOSITORY);
+    EXPECT_NE(error.text.find("could not find repository"), std::string::npos);
 }
 
-TEST_F(RepositoryHelpers, GetTheIndex)
-{
-    auto repository = makeRepository();
-    repository.write("file", "x");
-    repository.add();
-    const auto opened = open(repository);
-    const auto index = git::getRepositoryIndex(opened.get());
-    EXPECT_EQ(git_index_entrycount(index.get()), 1U);
-    EXPECT_EQ(git_index_owner(index.get()), opened.get());
-}
-
-TEST_F(RepositoryHelpers, RaiseForAnIndexThatCannotBeRead)
+TEST_F(RepositoryHelpers, GetAndWriteTheIndexOrRaiseWhereItIsLockedOrCannotBeRead)
 {
     const auto repository = makeRepository();
+    repository.write("file", "x");
+    const auto opened = open(repository);
+    {
+        const auto index = git::getRepositoryIndex(opened.get());
+        EXPECT_EQ(git_index_owner(index.get()), opened.get());
+        ASSERT_EQ(git_index_add_bypath(index.get(), "file"), 0);
+        repository.write(".git/index.lock", "");
+        EXPECT_EQ(failureOf([&] { git::writeIndex(index.get()); }).code, GIT_ELOCKED);
+        EXPECT_TRUE(std::filesystem::exists(repository / ".git/index.lock"));
+        EXPECT_FALSE(std::filesystem::exists(repository / ".git/index"));
+        repository.remove(".git/index.lock");
+        git::writeIndex(index.get());
+    }
+    EXPECT_EQ(repository.git({"ls-files"}), "file\n");
+    const auto again = open(repository);
+    EXPECT_EQ(git_index_entrycount(git::getRepositoryIndex(again.get()).get()), 1U);
     repository.write(".git/index",
                      "this is no index, and long enough to be told from an empty one");
-    const auto opened = open(repository);
-    const auto error = failureOf([&] { static_cast<void>(git::getRepositoryIndex(opened.get())); });
+    const auto broken = open(repository);
+    const auto error = failureOf([&] { static_cast<void>(git::getRepositoryIndex(broken.get())); });
     EXPECT_EQ(error.code, GIT_ERROR);
     EXPECT_EQ(error.errorClass, GIT_ERROR_INDEX);
-}
-
-TEST_F(RepositoryHelpers, WriteTheIndex)
-{
-    const auto repository = makeRepository();
-    repository.write("file", "x");
-    const auto opened = open(repository);
-    const auto index = git::getRepositoryIndex(opened.get());
-    ASSERT_EQ(git_index_add_bypath(index.get(), "file"), 0);
-    EXPECT_EQ(repository.git({"ls-files"}), "");
-    git::writeIndex(index.get());
-    EXPECT_EQ(repository.git({"ls-files"}), "file\n");
-}
-
-TEST_F(RepositoryHelpers, RaiseWhereTheIndexIsLocked)
-{
-    const auto repository = makeRepository();
-    repository.write("file", "x");
-    repository.write(".git/index.lock", "");
-    const auto opened = open(repository);
-    const auto index = git::getRepositoryIndex(opened.get());
-    ASSERT_EQ(git_index_add_bypath(index.get(), "file"), 0);
-    EXPECT_EQ(failureOf([&] { git::writeIndex(index.get()); }).code, GIT_ELOCKED);
-    EXPECT_TRUE(std::filesystem::exists(repository / ".git/index.lock"));
-    EXPECT_FALSE(std::filesystem::exists(repository / ".git/index"));
 }
 
 TEST_F(RepositoryHelpers, WriteTheTreeThatGitWrites)
@@ -149,31 +118,23 @@ TEST_F(RepositoryHelpers, RaiseForATreeOfAnIndexInConflict)
     EXPECT_EQ(failureOf([&] { git::writeIndexTree(index.get()); }).code, GIT_EUNMERGED);
 }
 
-TEST_F(RepositoryHelpers, LookATreeUp)
+TEST_F(RepositoryHelpers, LookATreeUpOrRaiseForAnIdThatIsNone)
 {
     auto repository = makeRepository();
     repository.write("sub/file", "x");
-    repository.commitAll("first");
+    const std::string commit = repository.commitAll("first");
     const auto opened = open(repository);
     git_oid id;
     ASSERT_EQ(git_oid_fromstr(&id, repository.line({"rev-parse", "HEAD^{tree}"}).c_str()), 0);
     const auto tree = git::lookupTree(opened.get(), &id);
     EXPECT_EQ(git_tree_entrycount(tree.get()), 1U);
     EXPECT_STREQ(git_tree_entry_name(git_tree_entry_byindex(tree.get(), 0)), "sub");
-}
-
-TEST_F(RepositoryHelpers, RaiseForAnIdThatIsNoTree)
-{
-    auto repository = makeRepository();
-    git_oid id;
-    ASSERT_EQ(git_oid_fromstr(&id, repository.commit("first").c_str()), 0);
-    const auto opened = open(repository);
-    EXPECT_EQ(failureOf([&] { static_cast<void>(git::lookupTree(opened.get(), &id)); }).code,
-              GIT_ENOTFOUND);
-    git_oid missing;
-    ASSERT_EQ(git_oid_fromstr(&missing, std::string(40, '1').c_str()), 0);
-    EXPECT_EQ(failureOf([&] { static_cast<void>(git::lookupTree(opened.get(), &missing)); }).code,
-              GIT_ENOTFOUND);
+    for (const std::string &none : {commit, std::string(40, '1')})
+    {
+        ASSERT_EQ(git_oid_fromstr(&id, none.c_str()), 0);
+        EXPECT_EQ(failureOf([&] { static_cast<void>(git::lookupTree(opened.get(), &id)); }).code,
+                  GIT_ENOTFOUND);
+    }
 }
 
 } // namespace

@@ -1,18 +1,26 @@
 // SPDX-License-Identifier: MIT
+// Replaces the program's operator new and delete, for AllocationCounter and FailingAllocations.
 #include "support/AllocationCounter.hpp"
 
 #include <atomic>
 #include <cstdlib>
 #include <new>
 
+#include "support/FailingAllocations.hpp"
+
 namespace
 {
 
 std::atomic<std::size_t> allocationCount{0};
 std::atomic<std::size_t> allocatedBytes{0};
+/// How many allocations succeed before one fails; negative: none fails.
+int allocationsLeft = -1;
+int pauses = 0;
 
-void *countedAllocation(std::size_t size, std::size_t alignment) noexcept
+void *allocate(std::size_t size, std::size_t alignment) noexcept
 {
+    if (allocationsLeft >= 0 && pauses == 0 && allocationsLeft-- == 0)
+        return nullptr;
     allocationCount.fetch_add(1, std::memory_order_relaxed);
     allocatedBytes.fetch_add(size, std::memory_order_relaxed);
     // The size of an aligned allocation is a multiple of the alignment; no allocation is empty.
@@ -22,9 +30,9 @@ void *countedAllocation(std::size_t size, std::size_t alignment) noexcept
                : std::aligned_alloc(alignment, rounded != 0 ? rounded : alignment);
 }
 
-void *countedAllocationOrThrow(std::size_t size, std::size_t alignment)
+void *allocateOrThrow(std::size_t size, std::size_t alignment)
 {
-    void *memory = countedAllocation(size, alignment);
+    void *memory = allocate(size, alignment);
     if (memory == nullptr)
         throw std::bad_alloc();
     return memory;
@@ -34,27 +42,27 @@ void *countedAllocationOrThrow(std::size_t size, std::size_t alignment)
 
 void *operator new(std::size_t size)
 {
-    return countedAllocationOrThrow(size, 1);
+    return allocateOrThrow(size, 1);
 }
 void *operator new[](std::size_t size)
 {
-    return countedAllocationOrThrow(size, 1);
+    return allocateOrThrow(size, 1);
 }
 void *operator new(std::size_t size, const std::nothrow_t &) noexcept
 {
-    return countedAllocation(size, 1);
+    return allocate(size, 1);
 }
 void *operator new[](std::size_t size, const std::nothrow_t &) noexcept
 {
-    return countedAllocation(size, 1);
+    return allocate(size, 1);
 }
 void *operator new(std::size_t size, std::align_val_t alignment)
 {
-    return countedAllocationOrThrow(size, static_cast<std::size_t>(alignment));
+    return allocateOrThrow(size, static_cast<std::size_t>(alignment));
 }
 void *operator new[](std::size_t size, std::align_val_t alignment)
 {
-    return countedAllocationOrThrow(size, static_cast<std::size_t>(alignment));
+    return allocateOrThrow(size, static_cast<std::size_t>(alignment));
 }
 void operator delete(void *memory) noexcept
 {
@@ -105,6 +113,28 @@ std::size_t AllocationCounter::count() const noexcept
 std::size_t AllocationCounter::bytes() const noexcept
 {
     return allocatedBytes.load() - bytesBefore_;
+}
+
+void letAllocationsSucceed(int count)
+{
+    allocationsLeft = count;
+}
+
+bool letAllAllocationsSucceed()
+{
+    const bool hasFailed = allocationsLeft < 0;
+    allocationsLeft = -1;
+    return hasFailed;
+}
+
+AllocationsSucceed::AllocationsSucceed() noexcept
+{
+    ++pauses;
+}
+
+AllocationsSucceed::~AllocationsSucceed()
+{
+    --pauses;
 }
 
 } // namespace vclink::test
