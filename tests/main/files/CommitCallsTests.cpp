@@ -235,104 +235,39 @@ TEST_F(CommitCalls, GoOnWithoutAParentWhenHeadFails)
     }
 }
 
-/// What a failing call leaves behind.
-enum class Survives
+TEST_F(CommitCalls, ThatFailAfterTheIndexIsWrittenLeaveTheMergeUnderWay)
 {
-    Everything,
-    AllButTheIndex
-};
-
-struct FailingCall
-{
-    const char *name;
-    Survives survives;
-};
-
-void PrintTo(const FailingCall &call, std::ostream *stream)
-{
-    *stream << call.name;
+    beginMerge({"file"});
+    repository_.write("sub/inside", "changed\n");
+    repository_.remove("other");
+    RepositoryState expected = stateOf(repository_);
+    expected.index = stateAfterGit({{"add", "--update"}}).index;
+    startNoting();
+    for (const auto *name : {"git_index_write_tree", "git_tree_lookup", "git_commit_create"})
+    {
+        calls_->fail({{name, -42}});
+        EXPECT_EQ(failureOf([this] { commitOnce(); }), (Failure{-42, GIT_ERROR_OS, "injected"}));
+        EXPECT_EQ(stateOf(repository_), expected) << name;
+    }
 }
 
-/// A merge with one conflict, one modified and one deleted file, whose conclusion fails at a call.
-class FailingCommitCall : public CommitCalls, public testing::WithParamInterface<FailingCall>
+TEST_F(CommitCalls, ThatFailAfterTheCommitLeaveItAndEndTheMergeUnlessThisFails)
 {
-  protected:
-    FailingCommitCall()
+    for (const std::string name : {"git_repository_state_cleanup", "git_object_lookup"})
     {
         beginMerge({"file"});
-        repository_.write("sub/inside", "changed\n");
-        repository_.remove("other");
+        const std::string head = idOf("HEAD");
+        const auto underWay = stateOf(repository_).underWay;
+        startNoting();
+        calls_->fail({{name, -42}});
+        EXPECT_EQ(failureOf([this] { commitOnce(); }), (Failure{-42, GIT_ERROR_OS, "injected"}));
+        EXPECT_THAT(parents(), ElementsAre(head, idOf("theirs")));
+        const auto left = stateOf(repository_).underWay;
+        EXPECT_EQ(left == underWay, name == "git_repository_state_cleanup");
+        EXPECT_EQ(left.count("MERGE_HEAD") == 0, name == "git_object_lookup");
+        repository_.git({"reset", "--quiet", "--hard"});
+        repository_.git({"branch", "--quiet", "-D", "theirs"});
     }
-};
-
-TEST_P(FailingCommitCall, LeavesTheMergeUnderWayAndReleasesEverything)
-{
-    const RepositoryState before = stateOf(repository_);
-    const auto index = vclink::test::indexStampOf(repository_);
-    RepositoryState expected = before;
-    if (GetParam().survives == Survives::AllButTheIndex)
-        expected.index = stateAfterGit({{"add", "--update"}}).index;
-    startNoting();
-    calls_->fail({{GetParam().name, -42}});
-    EXPECT_EQ(failureOf([this] { commitOnce(); }), (Failure{-42, GIT_ERROR_OS, "injected"}));
-    EXPECT_THAT(calls_->openHandles(), IsEmpty());
-    EXPECT_EQ(stateOf(repository_), expected);
-    const bool isIndexUntouched = vclink::test::indexStampOf(repository_) == index;
-    EXPECT_EQ(isIndexUntouched, GetParam().survives == Survives::Everything);
-}
-
-TEST_P(FailingCommitCall, DoesNotStandInTheWayOfTheNextCommit)
-{
-    startNoting();
-    calls_->fail({{GetParam().name, -42}});
-    failureOf([this] { commitOnce(); });
-    calls_->fail({});
-    commitOnce();
-    EXPECT_EQ(parents().size(), 2U);
-    EXPECT_THAT(namesIn(), ElementsAre("file", "sub/inside"));
-    EXPECT_EQ(committed("sub/inside"), "changed\n");
-}
-
-const std::vector<FailingCall> failingCalls{
-    {"git_repository_open_ext", Survives::Everything},
-    {"git_repository_mergehead_foreach", Survives::Everything},
-    {"git_commit_lookup", Survives::Everything},
-    {"git_signature_default", Survives::Everything},
-    {"git_repository_index", Survives::Everything},
-    {"git_index_update_all", Survives::Everything},
-    {"git_index_open", Survives::Everything},
-    {"git_index_write", Survives::Everything},
-    {"git_index_write_tree", Survives::AllButTheIndex},
-    {"git_tree_lookup", Survives::AllButTheIndex},
-    {"git_commit_create", Survives::AllButTheIndex}};
-
-INSTANTIATE_TEST_SUITE_P(EachCall, FailingCommitCall, testing::ValuesIn(failingCalls),
-                         [](const testing::TestParamInfo<FailingCall> &call)
-                         { return std::string(call.param.name); });
-
-TEST_F(CommitCalls, ThatFailToEndTheMergeLeaveTheCommit)
-{
-    beginMerge({"file"});
-    const std::string head = idOf("HEAD");
-    const auto underWay = stateOf(repository_).underWay;
-    startNoting();
-    calls_->fail({{"git_repository_state_cleanup", -42}});
-    EXPECT_EQ(failureOf([this] { commitOnce(); }), (Failure{-42, GIT_ERROR_OS, "injected"}));
-    EXPECT_THAT(calls_->openHandles(), IsEmpty());
-    EXPECT_THAT(parents(), ElementsAre(head, idOf("theirs")));
-    EXPECT_EQ(stateOf(repository_).underWay, underWay);
-}
-
-TEST_F(CommitCalls, ThatFailToSeeTheCommitHaveEndedTheMerge)
-{
-    beginMerge({"file"});
-    const std::string head = idOf("HEAD");
-    startNoting();
-    calls_->fail({{"git_object_lookup", -42}});
-    EXPECT_EQ(failureOf([this] { commitOnce(); }), (Failure{-42, GIT_ERROR_OS, "injected"}));
-    EXPECT_THAT(calls_->openHandles(), IsEmpty());
-    EXPECT_THAT(parents(), ElementsAre(head, idOf("theirs")));
-    EXPECT_EQ(stateOf(repository_).underWay.count("MERGE_HEAD"), 0U);
 }
 
 TEST_F(CommitCalls, ThatFailForTheIdentityLeaveTheIndexUnopened)
@@ -345,16 +280,6 @@ TEST_F(CommitCalls, ThatFailForTheIdentityLeaveTheIndexUnopened)
     EXPECT_THROW(commitOnce(), vclink::git::TagException<shared_vclink::git::NoUserName>);
     EXPECT_THAT(calls_->steps(), Not(Contains("git_repository_index")));
     EXPECT_THAT(calls_->openHandles(), IsEmpty());
-}
-
-TEST_F(CommitCalls, RaiseAFailingFallbackIdentity)
-{
-    repository_.git({"config", "--remove-section", "user"});
-    ::setenv("USER", "builder", 1);
-    const NothingChanges nothing(repository_);
-    startNoting();
-    calls_->fail({{"git_signature_now", -42}});
-    EXPECT_EQ(failureOf([this] { commitOnce(); }), (Failure{-42, GIT_ERROR_OS, "injected"}));
 }
 
 /// Only a missing value is a reason to go on without the configuration.
@@ -371,18 +296,6 @@ TEST_F(CommitCalls, RaiseEveryOtherFailureOfTheConfiguredIdentity)
     calls_->fail({{"git_signature_default", GIT_ENOTFOUND}});
     commitOnce();
     EXPECT_THAT(calls_->steps(), Contains("git_signature_now"));
-}
-
-TEST_F(CommitCalls, RaiseAFailureToPutBackWhatIsNotCheckedOut)
-{
-    repository_.git({"update-index", "--skip-worktree", "file"});
-    repository_.remove("file");
-    repository_.write("other", "changed\n");
-    const NothingChanges nothing(repository_);
-    startNoting();
-    calls_->fail({{"git_index_add", -42}});
-    EXPECT_EQ(failureOf([this] { commitOnce(); }), (Failure{-42, GIT_ERROR_OS, "injected"}));
-    EXPECT_THAT(calls_->openHandles(), IsEmpty());
 }
 
 } // namespace

@@ -1,12 +1,13 @@
 // SPDX-License-Identifier: MIT
-#include <chrono>
 #include <filesystem>
+#include <ostream>
 #include <string>
 #include <vector>
 
 #include <gtest/gtest.h>
 
 #include "main/AdapterFixture.hpp"
+#include "runScript.hpp"
 #include "support/text.hpp"
 
 namespace
@@ -38,129 +39,62 @@ class FileStates : public vclink::test::AdapterFixture
     vclink::test::GitRepository repository_ = makeRepository();
 };
 
-TEST_F(FileStates, OfAnUnchangedFileIsClean)
+/// What is done in a script of the shell, and the state of a file then, in a list and in the tree.
+struct StateCase
 {
-    expectState("file", "Clean");
+    const char *sentence;
+    const char *script;
+    const char *name;
+    const char *state;
+};
+
+void PrintTo(const StateCase &row, std::ostream *stream)
+{
+    *stream << row.script;
 }
 
-TEST_F(FileStates, OfAFileThatOnlyLooksChangedIsClean)
+class StateOf : public FileStates, public testing::WithParamInterface<StateCase>
 {
-    fs::last_write_time(repository_ / "file",
-                        fs::file_time_type::clock::now() - std::chrono::hours(24 * 365));
-    expectState("file", "Clean");
+};
+
+TEST_P(StateOf, Is)
+{
+    vclink::test::runScript(repository_, GetParam().script);
+    expectState(GetParam().name, GetParam().state);
 }
 
-TEST_F(FileStates, OfAnEditedFileIsModified)
-{
-    repository_.write("file", "edited\n");
-    expectState("file", "Modified");
-}
+const StateCase stateCases[] = {
+    {"AnUnchangedFile", ":", "file", "Clean"},
+    {"AFileThatOnlyLooksChanged", "touch -d '1 year ago' file", "file", "Clean"},
+    {"AnEditedFile", "echo edited >file", "file", "Modified"},
+    {"AnEditedFileOfTheSameLength", "echo CONTENT >file", "file", "Modified"},
+    {"AStagedEdit", "echo edited >file; git add file", "file", "Modified"},
+    {"AStagedEditThatWasTakenBack", "echo edited >file; git add file; echo content >file", "file",
+     "Modified"},
+    {"AStagedEditThatIsGoneFromDisk", "echo edited >file; git add file; rm file", "file",
+     "Modified"},
+    {"ANewStagedFile", "echo x >new; git add new", "new", "Added"},
+    {"ANewStagedFileEditedSince", "echo x >new; git add new; echo edited >new", "new", "Added"},
+    {"ANewStagedFileGoneSince", "echo x >new; git add new; rm new", "new", "Added"},
+    {"AFileAddedByIntent", "echo x >new; git add --intent-to-add new", "new", "Added"},
+    {"AFileRemovedFromTheIndex", "git rm --quiet file", "file", "Deleted"},
+    {"AFileRemovedFromTheIndexButStillOnDisk", "git rm --quiet --cached file", "file", "Deleted"},
+    {"AFileGoneFromDisk", "rm file", "file", "Missing"},
+    {"AnUntrackedFile", "echo x >new", "new", "Unversioned"},
+    {"AnIgnoredFile", "echo '*.o' >.gitignore; echo x >a.o", "a.o", ""},
+    {"ATrackedFileThatIsIgnoredToo", "echo file >.gitignore", "file", "Clean"},
+    {"AnEditedFileThatIsIgnoredToo", "echo file >.gitignore; echo edited >file", "file",
+     "Modified"},
+    {"ANameThatMatchesNothing", ":", "nothing", ""},
+    {"ANameBelowAFile", ":", "file/below", ""},
+    {"AChangedExecutableBit", "chmod 755 file", "file", "Modified"},
+    {"AStagedExecutableBit", "chmod 755 file; git add file", "file", "Modified"},
+    {"AnExecutableBitThatDoesNotCount", "git config core.fileMode false; chmod 755 file", "file",
+     "Clean"},
+};
 
-TEST_F(FileStates, OfAnEditedFileOfTheSameLengthIsModified)
-{
-    repository_.write("file", "CONTENT\n");
-    expectState("file", "Modified");
-}
-
-TEST_F(FileStates, OfAStagedEditIsModified)
-{
-    repository_.write("file", "edited\n");
-    repository_.add({"file"});
-    expectState("file", "Modified");
-}
-
-TEST_F(FileStates, OfAStagedEditThatWasTakenBackIsModified)
-{
-    repository_.write("file", "edited\n");
-    repository_.add({"file"});
-    repository_.write("file", "content\n");
-    expectState("file", "Modified");
-}
-
-TEST_F(FileStates, OfAStagedEditThatIsGoneFromDiskIsModified)
-{
-    repository_.write("file", "edited\n");
-    repository_.add({"file"});
-    repository_.remove("file");
-    expectState("file", "Modified");
-}
-
-TEST_F(FileStates, OfANewStagedFileIsAdded)
-{
-    repository_.write("new", "x");
-    repository_.add({"new"});
-    expectState("new", "Added");
-}
-
-TEST_F(FileStates, OfANewStagedFileEditedSinceIsAdded)
-{
-    repository_.write("new", "x");
-    repository_.add({"new"});
-    repository_.write("new", "edited since");
-    expectState("new", "Added");
-}
-
-TEST_F(FileStates, OfANewStagedFileGoneSinceIsAdded)
-{
-    repository_.write("new", "x");
-    repository_.add({"new"});
-    repository_.remove("new");
-    expectState("new", "Added");
-}
-
-TEST_F(FileStates, OfAFileAddedByIntentIsAdded)
-{
-    repository_.write("new", "x");
-    repository_.git({"add", "--intent-to-add", "new"});
-    expectState("new", "Added");
-}
-
-TEST_F(FileStates, OfAFileRemovedFromTheIndexIsDeleted)
-{
-    repository_.git({"rm", "--quiet", "file"});
-    expectState("file", "Deleted");
-}
-
-TEST_F(FileStates, OfAFileRemovedFromTheIndexButStillOnDiskIsDeleted)
-{
-    repository_.git({"rm", "--quiet", "--cached", "file"});
-    expectState("file", "Deleted");
-}
-
-TEST_F(FileStates, OfAFileGoneFromDiskIsMissing)
-{
-    repository_.remove("file");
-    expectState("file", "Missing");
-}
-
-TEST_F(FileStates, OfAnUntrackedFileIsUnversioned)
-{
-    repository_.write("new", "x");
-    expectState("new", "Unversioned");
-}
-
-TEST_F(FileStates, OfAnIgnoredFileIsNone)
-{
-    repository_.write(".gitignore", "*.o\n");
-    repository_.write("a.o", "x");
-    expectState("a.o", "");
-    EXPECT_EQ(states(repository_, {"a.o", "file"}), (States{{"file", "Clean"}}));
-}
-
-TEST_F(FileStates, OfATrackedFileThatIsIgnoredTooIsTheTrackedOne)
-{
-    repository_.write(".gitignore", "file\n");
-    expectState("file", "Clean");
-    repository_.write("file", "edited\n");
-    expectState("file", "Modified");
-}
-
-TEST_F(FileStates, OfANameThatMatchesNothingIsNone)
-{
-    expectState("nothing", "");
-    expectState("file/below", "");
-    EXPECT_EQ(states(repository_, {"nothing", "other"}), (States{{"other", "Clean"}}));
-}
+INSTANTIATE_TEST_SUITE_P(TheFile, StateOf, testing::ValuesIn(stateCases),
+                         [](const auto &row) { return row.param.sentence; });
 
 /// libgit2 tells one path, the old one, and nothing but the renaming.
 TEST_F(FileStates, OfAStagedRenamingIsUnknownUnderOnePath)
@@ -198,21 +132,6 @@ TEST_F(FileStates, OfAFileThatBecameALinkIsUnknown)
     EXPECT_EQ(states(repository_, {"file"}), (States{{"file", "Unknown"}}));
 }
 
-TEST_F(FileStates, OfAChangedExecutableBitIsModified)
-{
-    repository_.setMode("file", 0755);
-    expectState("file", "Modified");
-    repository_.add({"file"});
-    expectState("file", "Modified");
-}
-
-TEST_F(FileStates, OfAnExecutableBitThatDoesNotCountIsClean)
-{
-    repository_.git({"config", "core.fileMode", "false"});
-    repository_.setMode("file", 0755);
-    expectState("file", "Clean");
-}
-
 TEST_F(FileStates, OfAFileThatBecameAFolderAreMissingAndUnversioned)
 {
     repository_.remove("file");
@@ -235,35 +154,22 @@ TEST_F(FileStates, OfALineEndThatGitConvertsIsCleanOnceItIsStaged)
     expectState("file", "Clean");
 }
 
-TEST_F(FileStates, OfSeveralFilesComeFromOneCall)
+TEST_F(FileStates, OfSeveralFilesAndFoldersComeFromOneCall)
 {
+    repository_.write(".gitignore", "*.o\n");
+    for (const auto *name : {"a.o", "new", "sub/deep/new", "subway"})
+        repository_.write(name, "x");
     repository_.write("other", "edited\n");
-    repository_.write("new", "x");
-    repository_.write("sub/deep/new", "x");
-    EXPECT_EQ(states(repository_, {"sub/deep/new", "other", "file", "nothing"}),
+    EXPECT_EQ(states(repository_, {"sub/deep/new", "other", "file", "nothing", "a.o"}),
               (States{{"file", "Clean"}, {"other", "Modified"}, {"sub/deep/new", "Unversioned"}}));
-}
-
-TEST_F(FileStates, OfAFolderInAListAreThoseBelowIt)
-{
-    repository_.write("sub/deep/new", "x");
-    repository_.write("subway", "x");
     EXPECT_EQ(states(repository_, {"sub", "file"}),
               (States{{"file", "Clean"}, {"sub/deep/new", "Unversioned"}}));
-}
-
-TEST_F(FileStates, OfAFileNamedTwiceComeOnce)
-{
     EXPECT_EQ(states(repository_, {"file", "./file", "sub/../file"}), (States{{"file", "Clean"}}));
 }
 
-TEST_F(FileStates, OfAnEmptyListAreNone)
+TEST_F(FileStates, OfAnEmptyListAreNoneAlsoWithoutARepository)
 {
     EXPECT_EQ(states(repository_, {}), States());
-}
-
-TEST_F(FileStates, OfAnEmptyListAreNoneWithoutARepository)
-{
     EXPECT_TRUE(makeAdapter(folder() / "missing")->getFileStates({}).empty());
     EXPECT_TRUE(makeAdapter("")->getFileStates({}).empty());
 }

@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: MIT
-#include <filesystem>
 #include <functional>
+#include <ostream>
 #include <string>
 #include <vector>
 
@@ -9,6 +9,7 @@
 #include <gtest/gtest.h>
 
 #include "StagingFixture.hpp"
+#include "runScript.hpp"
 
 namespace
 {
@@ -58,35 +59,73 @@ TEST_F(RemoveFiles, EndsTheTrackingOfAFileAndLeavesItOnDisk)
     EXPECT_EQ(states(repository_, {"file"}), (States{{"file", "Deleted"}}));
 }
 
-TEST_F(RemoveFiles, LeavesTheRepositoryAsGitWould)
+/// What is done in a script of the shell, and what is removed as `git rm -r --cached` does.
+struct RemovalCase
 {
-    const RepositoryState expected = stateAfterGit({{"rm", "--cached", "file", "sub/inside"}});
-    remove({"sub/inside", "file"});
-    EXPECT_EQ(stateOf(repository_), expected);
+    const char *sentence;
+    const char *script;
+    std::vector<std::string> names;
+    /// what stays in the index
+    std::vector<std::string> left;
+};
+
+void PrintTo(const RemovalCase &row, std::ostream *stream)
+{
+    *stream << row.script;
 }
 
-TEST_F(RemoveFiles, DoesNotWriteTheFile)
+class RemoveAsGit : public RemoveFiles, public testing::WithParamInterface<RemovalCase>
+{
+};
+
+TEST_P(RemoveAsGit, Removes)
+{
+    vclink::test::runScript(repository_, GetParam().script);
+    std::vector<std::string> command{"rm", "-r", "--quiet", "--cached", "--"};
+    command.insert(command.end(), GetParam().names.begin(), GetParam().names.end());
+    const RepositoryState expected = stateAfterGit({command});
+    remove(GetParam().names);
+    EXPECT_EQ(stateOf(repository_), expected);
+    for (const auto &name : GetParam().left)
+        EXPECT_EQ(expected.index.count(name), 1U) << name;
+}
+
+const RemovalCase removalCases[] = {
+    {"SeveralFiles", ":", {"sub/inside", "file"}, {"other"}},
+    {"ATrackedFileThatIsIgnoredToo", "echo file >.gitignore", {"file"}, {"other"}},
+    {"AllBelowAFolder",
+     "mkdir sub/deep; echo x | tee 'sub/deep/#b' subway >sub/new; git add subway sub/deep",
+     {"sub"},
+     {"subway"}},
+    {"AllThatWasBelowAFolderThatIsGone", "rm -r sub", {"sub"}, {"file"}},
+    {"TheOneFileThatLooksLikeAComment", "echo x >'#notes#'; git add .", {"#notes#"}, {"file"}},
+    {"TheTwoFilesOfAListThatBeginDangerously",
+     "for name in '#a' '!b' a b; do echo x >\"$name\"; done; git add .",
+     {"#a", "!b"},
+     {"a", "b"}},
+    {"ALinkThatLeadsNowhere", "ln -s nowhere link; git add .", {"link"}, {"file"}},
+    {"TheFileWhereAFolderStandsNow",
+     "rm file; mkdir file; echo x >file/inside",
+     {"file"},
+     {"other"}},
+};
+
+INSTANTIATE_TEST_SUITE_P(It, RemoveAsGit, testing::ValuesIn(removalCases),
+                         [](const auto &row) { return row.param.sentence; });
+
+TEST_F(RemoveFiles, DoesNotWriteTheFileAndRefusesToRemoveItASecondTime)
 {
     const auto before = vclink::test::stampOf(repository_ / "file");
     remove({"file"});
     EXPECT_EQ(vclink::test::stampOf(repository_ / "file"), before);
-}
-
-TEST_F(RemoveFiles, RefusesToRemoveAFileASecondTime)
-{
-    remove({"file"});
     const NothingChanges nothing(repository_);
     expectRefuses({"file"});
 }
 
-TEST_F(RemoveFiles, RefusesAnEmptyList)
+TEST_F(RemoveFiles, RefusesAnEmptyListAndOpensNothingForIt)
 {
     const NothingChanges nothing(repository_);
     expectRefuses(std::vector<std::string>());
-}
-
-TEST_F(RemoveFiles, OpensNothingForAnEmptyList)
-{
     const auto adapter = makeAdapter(folder() / "missing");
     expectRefuses([&] { adapter->removeFiles({}); });
 }
@@ -114,18 +153,13 @@ TEST_F(RemoveFiles, PassesOverADeletedFileWithoutAWord)
     EXPECT_THAT(status(), ElementsAre("D  file", "D  other", "?? file", "?? other"));
 }
 
-TEST_F(RemoveFiles, LeavesAnUnversionedFileAsItIs)
+TEST_F(RemoveFiles, LeavesAnUnversionedFileAsItIsAndRemovesTheOthers)
 {
     repository_.write("new", "x");
     const RepositoryState before = stateOf(repository_);
     EXPECT_NO_THROW(remove({"new"}));
     EXPECT_EQ(stateOf(repository_), before);
     EXPECT_EQ(states(repository_, {"new"}), (States{{"new", "Unversioned"}}));
-}
-
-TEST_F(RemoveFiles, RemovesTheOthersBesideAnUnversionedFile)
-{
-    repository_.write("new", "x");
     remove({"new", "file"});
     EXPECT_THAT(status(), ElementsAre("D  file", "?? file", "?? new"));
 }
@@ -176,14 +210,6 @@ TEST_F(RemoveFiles, TakesAFileInConflictOutOfTheIndex)
     EXPECT_EQ(stateOf(repository_), expected);
 }
 
-TEST_F(RemoveFiles, RemovesATrackedFileThatIsIgnoredToo)
-{
-    repository_.write(".git/info/exclude", "file\n");
-    const RepositoryState expected = stateAfterGit({{"rm", "--cached", "file"}});
-    remove({"file"});
-    EXPECT_EQ(stateOf(repository_), expected);
-}
-
 TEST_F(RemoveFiles, WorksInARepositoryWithoutACommit)
 {
     const auto empty = makeRepository("empty");
@@ -206,25 +232,6 @@ TEST_F(RemoveFiles, TakesAnEmptyPathAndTheRootForNothing)
     EXPECT_THAT(status(), ElementsAre("D  file", "?? file"));
 }
 
-TEST_F(RemoveFiles, TakesAFolderForAllBelowIt)
-{
-    repository_.write("sub/deep/#b", "x");
-    repository_.write("subway", "x");
-    repository_.commitAll("second");
-    repository_.write("sub/new", "x");
-    const RepositoryState expected = stateAfterGit({{"rm", "-r", "--cached", "sub"}});
-    remove({"sub"});
-    EXPECT_EQ(stateOf(repository_), expected);
-    EXPECT_EQ(expected.index.count("subway"), 1U);
-}
-
-TEST_F(RemoveFiles, TakesAFolderThatIsGoneForAllThatWasBelowIt)
-{
-    repository_.remove("sub");
-    remove({"sub"});
-    EXPECT_THAT(status(), ElementsAre("D  sub/inside"));
-}
-
 TEST_F(RemoveFiles, TakesAFolderWithADangerousNameForItsOwnEntry)
 {
     for (const auto *name : {"#dir/a", "!dir/a", "dir /a"})
@@ -232,27 +239,6 @@ TEST_F(RemoveFiles, TakesAFolderWithADangerousNameForItsOwnEntry)
     repository_.commitAll("second");
     const NothingChanges nothing(repository_);
     expectRefuses({"#dir", "!dir", "dir "});
-}
-
-TEST_F(RemoveFiles, RemovesTheOneFileThatLooksLikeAComment)
-{
-    repository_.write("#notes#", "x");
-    repository_.commitAll("second");
-    const RepositoryState expected = stateAfterGit({{"rm", "--cached", "#notes#"}});
-    remove({"#notes#"});
-    EXPECT_EQ(stateOf(repository_), expected);
-    EXPECT_EQ(expected.index.size(), 3U);
-}
-
-TEST_F(RemoveFiles, RemovesTheTwoFilesOfAListThatBeginDangerously)
-{
-    for (const auto *name : {"#a", "!b", "a", "b"})
-        repository_.write(name, "x");
-    repository_.commitAll("second");
-    const RepositoryState expected = stateAfterGit({{"rm", "--cached", "#a", "!b"}});
-    remove({"#a", "!b"});
-    EXPECT_EQ(stateOf(repository_), expected);
-    EXPECT_EQ(expected.index.count("a") + expected.index.count("b"), 2U);
 }
 
 TEST_F(RemoveFiles, TakesALinkForItsTarget)
@@ -272,28 +258,11 @@ TEST_F(RemoveFiles, TakesALinkAmongTheFilesOfAFolderForItsTarget)
     EXPECT_THAT(status(), ElementsAre("D  file", "D  sub/inside", "?? file", "?? sub/inside"));
 }
 
-TEST_F(RemoveFiles, TakesALinkThatLeadsNowhereForItself)
-{
-    repository_.symlink("nowhere", "link");
-    repository_.commitAll("second");
-    remove({"link"});
-    EXPECT_THAT(status(), ElementsAre("D  link", "?? link"));
-    EXPECT_EQ(std::filesystem::read_symlink(repository_ / "link"), "nowhere");
-}
-
 TEST_F(RemoveFiles, RaisesOnALoopOfLinks)
 {
     repository_.symlink("loop", "loop");
     const NothingChanges nothing(repository_);
     EXPECT_THROW(remove({"file", "loop"}), boost::filesystem::filesystem_error);
-}
-
-TEST_F(RemoveFiles, TakesTheFileWhereAFolderStandsNow)
-{
-    repository_.remove("file");
-    repository_.write("file/inside", "x");
-    remove({"file"});
-    EXPECT_THAT(status(), ElementsAre("D  file", "?? file/inside"));
 }
 
 TEST_F(RemoveFiles, TakesTheFilesOfAFolderWhereAFileStandsNow)

@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: MIT
+#include <ostream>
 #include <string>
 #include <vector>
 
@@ -6,6 +7,7 @@
 #include <gtest/gtest.h>
 
 #include "StagingFixture.hpp"
+#include "runScript.hpp"
 
 namespace
 {
@@ -25,67 +27,56 @@ class RevertFiles : public vclink::test::StagingFixture
 {
 };
 
-TEST_F(RevertFiles, ThrowsAnEditAway)
+/// What is done in a script of the shell, what is reverted, and git's status then.
+struct RevertCase
 {
-    repository_.write("file", "edited\n");
-    expectRevertsAsGit({"file"});
-    EXPECT_EQ(repository_.read("file"), "content of file\n");
-    EXPECT_THAT(status(), ElementsAre());
+    const char *sentence;
+    const char *script;
+    std::vector<std::string> names;
+    std::vector<std::string> status{};
+};
+
+void PrintTo(const RevertCase &row, std::ostream *stream)
+{
+    *stream << row.script;
 }
 
-TEST_F(RevertFiles, ThrowsAStagedEditAway)
+class RevertAsGit : public RevertFiles, public testing::WithParamInterface<RevertCase>
 {
-    repository_.write("file", "staged\n");
-    repository_.add({"file"});
-    expectRevertsAsGit({"file"});
-    EXPECT_THAT(status(), ElementsAre());
+};
+
+TEST_P(RevertAsGit, Reverts)
+{
+    vclink::test::runScript(repository_, GetParam().script);
+    expectRevertsAsGit(GetParam().names);
+    EXPECT_EQ(status(), GetParam().status);
 }
 
-TEST_F(RevertFiles, ThrowsAStagedEditAndTheEditOnTopOfItAway)
-{
-    repository_.write("file", "staged\n");
-    repository_.add({"file"});
-    repository_.write("file", "edited\n");
-    expectRevertsAsGit({"file"});
-    EXPECT_THAT(status(), ElementsAre());
-}
+const RevertCase revertCases[] = {
+    {"AnEdit", "echo edited >file", {"file"}},
+    {"AStagedEdit", "echo staged >file; git add file", {"file"}},
+    {"AStagedEditAndTheEditOnTopOfIt",
+     "echo staged >file; git add file; echo edited >file",
+     {"file"}},
+    {"AnEditOfTheSameLength", "echo CONTENT OF FILE >file", {"file"}},
+    {"AFileThatIsGoneFromDisk", "rm file", {"file"}},
+    {"AFileThatIsGoneWithTheFolderAboveIt", "rm -r sub", {"sub/inside"}},
+    {"AFileWhoseDeletionIsStaged", "git rm --quiet file", {"file"}},
+    {"AFileThatWasTakenOutOfTheIndex", "git rm --quiet --cached file; echo edited >file", {"file"}},
+    {"SeveralFilesAtOnce",
+     "echo edited >file; rm sub/inside; git rm --quiet other",
+     {"sub/inside", "other", "file"}},
+    {"NoOtherChanges",
+     "echo edited >file; echo staged >other; git add other; echo edited >other; rm sub/inside; "
+     "echo x >added; git add added; echo x >new",
+     {"file"},
+     {"A  added", "MM other", " D sub/inside", "?? new"}},
+    {"AFolderThatIsGone", "rm -r sub", {"sub"}},
+    {"WithAHeadThatNamesNoBranch", "git checkout --quiet --detach; echo edited >file", {"file"}},
+};
 
-TEST_F(RevertFiles, ThrowsAnEditOfTheSameLengthAway)
-{
-    repository_.write("file", "CONTENT OF FILE\n");
-    expectRevertsAsGit({"file"});
-    EXPECT_EQ(repository_.read("file"), "content of file\n");
-}
-
-TEST_F(RevertFiles, BringsBackAFileThatIsGoneFromDisk)
-{
-    repository_.remove("file");
-    expectRevertsAsGit({"file"});
-    EXPECT_EQ(repository_.read("file"), "content of file\n");
-}
-
-TEST_F(RevertFiles, BringsBackAFileWithTheFolderAboveIt)
-{
-    repository_.remove("sub");
-    expectRevertsAsGit({"sub/inside"});
-    EXPECT_EQ(repository_.read("sub/inside"), "content of sub/inside\n");
-}
-
-TEST_F(RevertFiles, BringsBackAFileWhoseDeletionIsStaged)
-{
-    repository_.git({"rm", "--quiet", "file"});
-    expectRevertsAsGit({"file"});
-    EXPECT_THAT(status(), ElementsAre());
-}
-
-TEST_F(RevertFiles, TracksAFileAgainThatWasTakenOutOfTheIndex)
-{
-    repository_.git({"rm", "--quiet", "--cached", "file"});
-    repository_.write("file", "edited since\n");
-    expectRevertsAsGit({"file"});
-    EXPECT_EQ(repository_.read("file"), "content of file\n");
-    EXPECT_THAT(status(), ElementsAre());
-}
+INSTANTIATE_TEST_SUITE_P(It, RevertAsGit, testing::ValuesIn(revertCases),
+                         [](const auto &row) { return row.param.sentence; });
 
 TEST_F(RevertFiles, TakesAnAddedFileOutOfTheIndexAndLeavesItOnDisk)
 {
@@ -98,53 +89,20 @@ TEST_F(RevertFiles, TakesAnAddedFileOutOfTheIndexAndLeavesItOnDisk)
     EXPECT_THAT(status(), ElementsAre("?? new"));
 }
 
-TEST_F(RevertFiles, LeavesAnUntrackedFileAlone)
-{
-    repository_.write("new", "x");
-    repository_.write("file", "edited\n");
-    const auto before = stampOf(repository_ / "new");
-    revert({"new", "file"});
-    EXPECT_EQ(stampOf(repository_ / "new"), before);
-    EXPECT_THAT(status(), ElementsAre("?? new"));
-}
-
-TEST_F(RevertFiles, LeavesAnIgnoredFileAlone)
+TEST_F(RevertFiles, LeavesUntrackedIgnoredAndUnchangedFilesAlone)
 {
     repository_.write(".git/info/exclude", "*.o\n");
-    repository_.write("a.o", "x");
-    const auto before = stampOf(repository_ / "a.o");
-    revert({"a.o"});
-    EXPECT_EQ(stampOf(repository_ / "a.o"), before);
-}
-
-TEST_F(RevertFiles, DoesNotWriteAFileWithoutChanges)
-{
-    const auto before = stampOf(repository_ / "file");
-    revert({"file"});
-    EXPECT_EQ(stampOf(repository_ / "file"), before);
-}
-
-TEST_F(RevertFiles, LeavesAllOtherChanges)
-{
-    repository_.write("file", "edited\n");
-    repository_.write("other", "staged\n");
-    repository_.add({"other"});
-    repository_.write("other", "edited\n");
-    repository_.remove("sub/inside");
-    repository_.write("added", "x");
-    repository_.add({"added"});
-    repository_.write("new", "x");
-    expectRevertsAsGit({"file"});
-    EXPECT_THAT(status(), ElementsAre("A  added", "MM other", " D sub/inside", "?? new"));
-}
-
-TEST_F(RevertFiles, RevertsSeveralFilesAtOnce)
-{
-    repository_.write("file", "edited\n");
-    repository_.remove("sub/inside");
-    repository_.git({"rm", "--quiet", "other"});
-    expectRevertsAsGit({"sub/inside", "other", "file"});
-    EXPECT_THAT(status(), ElementsAre());
+    for (const auto *name : {"new", "a.o", "file"})
+        repository_.write(name, "edited\n");
+    const auto stamps = [this]
+    {
+        return std::vector{stampOf(repository_ / "new"), stampOf(repository_ / "a.o"),
+                           stampOf(repository_ / "other")};
+    };
+    const auto before = stamps();
+    revert({"new", "a.o", "other", "file"});
+    EXPECT_EQ(stamps(), before);
+    EXPECT_THAT(status(), ElementsAre("?? new"));
 }
 
 TEST_F(RevertFiles, DoesNothingForAnEmptyList)
@@ -190,12 +148,6 @@ TEST_F(RevertFiles, TakesAFolderForAllBelowIt)
     EXPECT_THAT(status(), ElementsAre(" M subway", "?? sub/new"));
 }
 
-TEST_F(RevertFiles, TakesAFolderThatIsGoneForAllThatWasBelowIt)
-{
-    repository_.remove("sub");
-    expectRevertsAsGit({"sub"});
-}
-
 TEST_F(RevertFiles, TakesAFolderWithADangerousNameForItsOwnEntry)
 {
     repository_.write("#dir/a", "x");
@@ -207,13 +159,6 @@ TEST_F(RevertFiles, TakesAFolderWithADangerousNameForItsOwnEntry)
     const RepositoryState before = stateOf(repository_);
     revert({"#dir", "dir "});
     EXPECT_EQ(stateOf(repository_), before);
-}
-
-TEST_F(RevertFiles, WorksWithAHeadThatNamesNoBranch)
-{
-    repository_.git({"checkout", "--quiet", "--detach"});
-    repository_.write("file", "edited\n");
-    expectRevertsAsGit({"file"});
 }
 
 TEST_F(RevertFiles, GoesBackToTheCommitThatHeadNames)
@@ -276,21 +221,13 @@ TEST_F(RevertFiles, RefusesAFileInConflictAndRevertsNoOther)
     EXPECT_EQ(states(repository_, {"file"}), (States{{"file", "Modified"}}));
 }
 
-TEST_F(RevertFiles, ReportsTheFilesInConflictInTheOrderOfPaths)
+TEST_F(RevertFiles, ReportsTheFilesInConflictInTheOrderOfPathsAlsoOfAFolder)
 {
     beginMerge({"a-b", "a.b", "a/x", "B"});
     const NothingChanges nothing(repository_);
-    expectRefusal<Conflicted>(inRoot({"B", "a/x", "a-b", "a.b"}),
-                              [this] {
-                                  revert({"file", "a.b", "a-b", "a/x", "B", "./a.b"});
-                              });
-}
-
-TEST_F(RevertFiles, RefusesAFolderWithAFileInConflict)
-{
-    beginMerge({"dir/conflicted"});
-    const NothingChanges nothing(repository_);
-    expectRefusal<Conflicted>(inRoot({"dir/conflicted"}), [this] { revert({"dir"}); });
+    const std::vector<std::string> names{"file", "a.b", "a-b", "a/x", "B", "./a.b"};
+    expectRefusal<Conflicted>(inRoot({"B", "a/x", "a-b", "a.b"}), [&] { revert(names); });
+    expectRefusal<Conflicted>(inRoot({"a/x"}), [this] { revert({"a"}); });
 }
 
 TEST_F(RevertFiles, RefusesWithTheCataloguesText)

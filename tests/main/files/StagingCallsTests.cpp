@@ -1,5 +1,4 @@
 // SPDX-License-Identifier: MIT
-#include <functional>
 #include <string>
 #include <vector>
 
@@ -20,10 +19,7 @@ using shared_vclink::git::NoFilesToRemove;
 using testing::ElementsAre;
 using testing::IsEmpty;
 using vclink::git::TagException;
-using vclink::test::Failure;
-using vclink::test::failureOf;
 using vclink::test::LibGit2Recorder;
-using vclink::test::NothingChanges;
 using vclink::test::ofTheQuery;
 using vclink::test::operator+;
 using Names = std::vector<std::string>;
@@ -198,94 +194,6 @@ TEST_F(StagingCalls, AreThoseOfTheQueryAloneWhereAFileIsRefused)
     EXPECT_THROW(add({"new", "file"}), TagException<AlreadyAdded>);
     EXPECT_EQ(calls_.steps(), ofTheQuery);
     EXPECT_THAT(calls_.openHandles(), IsEmpty());
-}
-
-/// One of the calls of staging that fail, and those that are made nevertheless.
-struct FailingIndexCall
-{
-    std::string name;
-    Names expected;
-    /// which of the calls by this name; 0 for each
-    std::size_t call = 0;
-};
-
-class FailingStagingCalls : public StagingCalls
-{
-  protected:
-    void expectFails(const FailingIndexCall &failing, const std::function<void()> &operation)
-    {
-        SCOPED_TRACE(failing.name);
-        calls_.clear();
-        calls_.fail({{failing.name, GIT_EAUTH, failing.call}});
-        const NothingChanges nothing(repository_);
-        EXPECT_EQ(failureOf(operation), (Failure{GIT_EAUTH, GIT_ERROR_OS, "injected"}));
-        EXPECT_EQ(calls_.steps(), failing.expected);
-        EXPECT_THAT(calls_.openHandles(), IsEmpty());
-    }
-};
-
-TEST_F(FailingStagingCalls, EndAnAdditionAndReleaseTheHandles)
-{
-    const Names index = ofTheLock + Names{"git_repository_index"};
-    const Names addAll = index + Names{"git_index_add_all"};
-    const std::vector<FailingIndexCall> failing{
-        {"git_repository_open_ext", ofTheOpening},
-        {"git_index_open", ofTheOpening + Names{"git_index_open", "git_repository_free"}},
-        {"git_repository_set_index",
-         ofTheOpening + Names{"git_index_open", "git_repository_set_index"} + ofTheEnd},
-        {"git_index_set_caps",
-         ofTheOpening + Names{"git_index_open", "git_repository_set_index", "git_index_set_caps"} +
-             ofTheEnd},
-        {"git_repository_index", index + Names{"git_repository_free"}},
-        {"git_index_add_all", addAll + ofTheEnd},
-        {"git_index_write", addAll + Names{"git_index_write"} + ofTheEnd}};
-    for (const auto &call : failing)
-        expectFails(call, [this] { markResolved("new"); });
-    for (auto call = failing.begin() + 1; call != failing.end(); ++call)
-    {
-        const FailingIndexCall afterTheQuery{call->name, ofTheQuery + call->expected};
-        expectFails(afterTheQuery, [this] { add({"new"}); });
-    }
-}
-
-TEST_F(FailingStagingCalls, EndARemovalAndReleaseTheHandles)
-{
-    const Names index = ofTheLock + Names{"git_repository_index"};
-    const Names removeAll = index + Names{"git_index_remove_all"};
-    const std::vector<FailingIndexCall> failing{
-        {"git_repository_open_ext", ofTheOpening},
-        {"git_index_open", ofTheOpening + Names{"git_index_open", "git_repository_free"}},
-        {"git_repository_set_index",
-         ofTheOpening + Names{"git_index_open", "git_repository_set_index"} + ofTheEnd},
-        {"git_index_set_caps",
-         ofTheOpening + Names{"git_index_open", "git_repository_set_index", "git_index_set_caps"} +
-             ofTheEnd},
-        {"git_repository_index", index + Names{"git_repository_free"}},
-        {"git_index_remove_all", removeAll + ofTheEnd},
-        {"git_index_write", removeAll + Names{"git_index_write"} + ofTheEnd}};
-    for (const auto &call : failing)
-        expectFails(call, [this] { markResolved("missing"); });
-    for (auto call = failing.begin() + 1; call != failing.end(); ++call)
-    {
-        const FailingIndexCall afterTheQuery{call->name, ofTheQuery + call->expected};
-        expectFails(afterTheQuery, [this] { remove({"file"}); });
-    }
-}
-
-TEST_F(FailingStagingCalls, OfTheSecondOpeningEndAnOperation)
-{
-    const FailingIndexCall second{"git_repository_open_ext",
-                                  ofTheQuery + Names{"git_repository_open_ext"}, 2};
-    expectFails(second, [this] { add({"new"}); });
-    expectFails(second, [this] { remove({"file"}); });
-}
-
-TEST_F(FailingStagingCalls, OfTheQueryEndAnOperationToo)
-{
-    const FailingIndexCall open{"git_repository_open_ext",
-                                {"git_status_options_init", "git_repository_open_ext"}};
-    expectFails(open, [this] { add({"new"}); });
-    expectFails(open, [this] { remove({"file"}); });
 }
 
 } // namespace
