@@ -188,7 +188,7 @@ TEST_F(DebianPackages, HaveNothingThatDebiansPolicyRemarks)
     {
         lintian.push_back(package.second.string());
     }
-    const auto result = Command(lintian).timeout(std::chrono::minutes(2)).run();
+    const auto result = Command(lintian).timeout(std::chrono::minutes(8)).run();
     EXPECT_TRUE(result.succeeded()) << result.output << result.errors;
 }
 
