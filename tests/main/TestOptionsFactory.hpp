@@ -8,8 +8,7 @@
 namespace vclink::test
 {
 
-/// A host's own factory, which tells when it is asked for the options of a clone, a status walk or
-/// a checkout and when it goes.
+/// A host's own factory, which tells when it is asked for options and when it goes.
 class TestOptionsFactory : public git::GitOptionsFactory
 {
   public:
@@ -27,15 +26,21 @@ class TestOptionsFactory : public git::GitOptionsFactory
     }
     git::FetchOptions makeFetchOptions() override
     {
+        if (onFetchOptions)
+            onFetchOptions();
         return {};
     }
     git::ProxyOptions makeProxyOptions() override
     {
+        if (onProxyOptions)
+            onProxyOptions();
         return {};
     }
     git::PushOptions makePushOptions() override
     {
-        return {};
+        if (onPushOptions)
+            onPushOptions();
+        return pushOptions;
     }
     git::CheckoutOptions makeCheckoutOptions() override
     {
@@ -51,6 +56,8 @@ class TestOptionsFactory : public git::GitOptionsFactory
     }
     git::MergeOptions makeMergeOptions() override
     {
+        if (onMergeOptions)
+            onMergeOptions();
         return {};
     }
 
@@ -59,6 +66,11 @@ class TestOptionsFactory : public git::GitOptionsFactory
     std::function<void()> onStatusOptions;
     std::function<void()> onCheckoutOptions;
     git::CheckoutOptions checkoutOptions;
+    std::function<void()> onMergeOptions;
+    std::function<void()> onFetchOptions;
+    std::function<void()> onProxyOptions;
+    std::function<void()> onPushOptions;
+    git::PushOptions pushOptions;
     std::function<void()> onDestruction;
 };
 

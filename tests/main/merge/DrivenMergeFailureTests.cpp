@@ -25,10 +25,7 @@ namespace
 
 namespace git = vclink::git;
 using testing::HasSubstr;
-using vclink::test::LogCapture;
-using vclink::test::LogRecord;
-using vclink::test::NothingLeft;
-using vclink::test::textOf;
+using namespace vclink::test;
 using vclink::util::exception::CancelledOperationException;
 
 constexpr unsigned tracedSeverities =
@@ -59,7 +56,7 @@ class RunOfTheDriver
 class NothingMerged
 {
   public:
-    explicit NothingMerged(vclink::test::GitRepository repository)
+    explicit NothingMerged(GitRepository repository)
         : repository_(std::move(repository)), before_(state())
     {
     }
@@ -71,18 +68,18 @@ class NothingMerged
     }
 
   private:
-    vclink::test::RepositoryState state() const
+    RepositoryState state() const
     {
-        vclink::test::RepositoryState state = vclink::test::stateOf(repository_);
+        RepositoryState state = stateOf(repository_);
         state.underWay.erase("ORIG_HEAD");
         return state;
     }
 
-    vclink::test::GitRepository repository_;
-    vclink::test::RepositoryState before_;
+    GitRepository repository_;
+    RepositoryState before_;
 };
 
-class DrivenMergeFailure : public vclink::test::DrivenMergeFixture
+class DrivenMergeFailure : public DrivenMergeFixture
 {
   protected:
     /// Merges with `raise` done at one step of the driver's run.
@@ -143,7 +140,7 @@ TEST_F(DrivenMergeFailure, OfEveryStandardKindAtEveryStepTellsItsText)
             catch (const git::GitException &exception)
             {
                 EXPECT_EQ(exception.GetID(), "shared_vclink:git:MergeFailed");
-                EXPECT_THAT(vclink::test::asUtf8(exception.GetUnicodeMessageTxt()),
+                EXPECT_THAT(asUtf8(exception.GetUnicodeMessageTxt()),
                             testing::EndsWith('\n' + text));
             }
         }
@@ -197,10 +194,10 @@ TEST_F(DrivenMergeFailure, OfAHostThatIgnoresItsChildrenStartsNoCommand)
     {
         defineScript("echo run >" + mark + "; exit " + std::to_string(status));
         const NothingMerged nothing(repository_);
-        const vclink::test::SignalAction ignored(SIGCHLD, SIG_IGN);
+        const SignalAction ignored(SIGCHLD, SIG_IGN);
         EXPECT_THAT(failureHere(), HasSubstr("SIGCHLD"));
     }
-    EXPECT_EQ(vclink::test::Scripts::read(mark), "");
+    EXPECT_EQ(Scripts::read(mark), "");
     expectTheNextToSucceed();
 }
 
@@ -228,7 +225,7 @@ TEST_F(DrivenMergeFailure, OfASideThatCannotBeReadIsLibGit2s)
         repository_.write(object, bytes);
         EXPECT_EQ(branches().getRepositoryState(), "Normal");
     }
-    EXPECT_EQ(vclink::test::Scripts::read(mark), "");
+    EXPECT_EQ(Scripts::read(mark), "");
     expectTheNextToSucceed();
 }
 
@@ -245,7 +242,7 @@ TEST_F(DrivenMergeFailure, OfAnyKindIsToldBeforeTheNextFileIsAskedFor)
     repository_.git({"config", "merge.second.driver", scripts_.shell("echo run >" + mark)});
     define("/nowhere/tool");
     EXPECT_THAT(failure(), HasSubstr("No such file or directory"));
-    EXPECT_EQ(vclink::test::Scripts::read(mark), "");
+    EXPECT_EQ(Scripts::read(mark), "");
 }
 
 } // namespace

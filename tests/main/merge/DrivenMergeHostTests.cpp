@@ -18,12 +18,9 @@ namespace
 {
 
 namespace fs = std::filesystem;
-using vclink::test::NothingLeft;
-using vclink::test::NoWorkingFolder;
-using vclink::test::SignalAction;
-using vclink::test::ThousandDescriptors;
+using namespace vclink::test;
 
-class DrivenMergeHost : public vclink::test::DrivenMergeFixture
+class DrivenMergeHost : public DrivenMergeFixture
 {
   protected:
     DrivenMergeHost()
@@ -107,9 +104,9 @@ TEST_F(DrivenMergeHost, WithoutAWritableTemporaryFolderRunsTheCommandOnNothing)
     fs::create_directory(temporary);
     ::setenv("TMPDIR", temporary.c_str(), 1);
     defineScript("for f; do test -e \"$f\" && exit 1; done; exit 0");
-    vclink::test::giveToUnprivilegedUser(folder().path());
+    giveToUnprivilegedUser(folder().path());
     fs::permissions(temporary, fs::perms(0555));
-    const std::string answer = vclink::test::runAsUnprivilegedUser(
+    const std::string answer = runAsUnprivilegedUser(
         [this]() -> std::string
         {
             mergeAnew();

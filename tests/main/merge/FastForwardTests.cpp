@@ -2,6 +2,7 @@
 #include <memory>
 #include <stdexcept>
 #include <string>
+#include <vector>
 
 #include <git2.h>
 #include <gmock/gmock.h>
@@ -14,6 +15,7 @@
 #include "support/LogCapture.hpp"
 #include "support/cancelAt.hpp"
 #include "support/text.hpp"
+#include "vclink/git/GitException.hpp"
 #include "vclink/util/exception/CancelledOperationException.hpp"
 
 namespace
@@ -23,17 +25,11 @@ namespace git = vclink::git;
 using testing::ElementsAre;
 using testing::HasSubstr;
 using testing::IsEmpty;
-using vclink::test::cancelAt;
-using vclink::test::Failure;
-using vclink::test::LogCapture;
-using vclink::test::NothingChanges;
-using vclink::test::ProgressCall;
-using vclink::test::stateOf;
-using vclink::test::textOf;
+using namespace vclink::test;
 using vclink::util::exception::CancelledOperationException;
 
 /// "topic" is ahead of main: it changes "file", drops "other" and has "folder/new".
-class FastForward : public vclink::test::MergeFixture
+class FastForward : public MergeFixture
 {
   protected:
     FastForward()
@@ -46,22 +42,13 @@ class FastForward : public vclink::test::MergeFixture
                        repository_.write("folder/new", "x");
                        repository_.write("same", "x");
                    });
-        // What neither side changes.
-        repository_.git({"checkout", "--quiet", "main"});
     }
 
-    void expectRefused(const Failure &failure) const
-    {
-        const NothingChanges nothing(repository_);
-        EXPECT_EQ(failureOfMerge("topic"), textOf(failure));
-    }
     static std::string cancellation()
     {
         return CancelledOperationException().what();
     }
 };
-
-const Failure oneFileInTheWay{GIT_ECONFLICT, GIT_ERROR_CHECKOUT, "1 conflict prevents checkout"};
 
 TEST_F(FastForward, MovesTheBranchTheIndexAndTheFilesAndMakesNoCommit)
 {
@@ -99,29 +86,27 @@ TEST_F(FastForward, KeepsChangesThatItDoesNotTouch)
     EXPECT_THAT(status(), ElementsAre(" M same", "?? untracked"));
 }
 
-TEST_F(FastForward, IsRefusedByAChangeThatItTouches)
+/// Whatever the host's factory gives.
+TEST_F(FastForward, IsRefusedByWorkInItsWay)
 {
-    repository_.write("file", "mine\n");
-    expectRefused(oneFileInTheWay);
-}
-
-TEST_F(FastForward, IsRefusedByAStagedChangeThatItTouches)
-{
-    repository_.write("file", "mine\n");
-    repository_.add({"file"});
-    expectRefused(oneFileInTheWay);
-}
-
-TEST_F(FastForward, IsRefusedByAnUntrackedFileInTheWay)
-{
-    repository_.write("folder/new", "mine\n");
-    expectRefused(oneFileInTheWay);
-}
-
-TEST_F(FastForward, IsRefusedByAChangeOfAFileThatItDrops)
-{
-    repository_.write("other", "mine\n");
-    expectRefused(oneFileInTheWay);
+    const auto factory = std::make_shared<TestOptionsFactory>(interactor_);
+    factory->checkoutOptions.checkoutStrategy = GIT_CHECKOUT_FORCE;
+    git::GitAdapter forcing(asPath(repository_.path()), factory);
+    const std::vector<Change> works{writes("file", "mine\n"),
+                                    writes("file", "mine\n") + runsGit({"add", "file"}),
+                                    writes("folder/new", "mine\n"), writes("other", "mine\n")};
+    for (const auto &work : works)
+    {
+        work(repository_);
+        {
+            const NothingChanges nothing(repository_);
+            EXPECT_EQ(failureOfMerge("topic"), textOf(Failure{GIT_ECONFLICT, GIT_ERROR_CHECKOUT,
+                                                              "1 conflict prevents checkout"}));
+            EXPECT_THROW(git::BranchManager::create(forcing)->merge("topic"), git::GitException);
+        }
+        repository_.git({"reset", "--quiet", "--hard"});
+        repository_.git({"clean", "--quiet", "--force", "-d"});
+    }
 }
 
 TEST_F(FastForward, OverwritesAnIgnoredFileAsGitDoes)
@@ -162,26 +147,19 @@ TEST_F(FastForward, GoesOnWhenItsProgressCannotBeShown)
     EXPECT_EQ(git::pendingCallbackException(), nullptr);
 }
 
-TEST_F(FastForward, CancelledBeforeItsStartMovesNothing)
+TEST_F(FastForward, CancelledBeforeItWritesMovesNothing)
 {
-    interactor_->cancel();
-    {
-        const NothingChanges nothing(repository_);
-        EXPECT_EQ(failureOfMerge("topic"), cancellation());
-    }
-    EXPECT_EQ(git::pendingCallbackException(), nullptr);
-    EXPECT_THAT(interactor_->progress.calls, IsEmpty());
-    EXPECT_NO_THROW(merge("topic"));
-    EXPECT_EQ(idOf("main"), idOf("topic"));
-}
-
-TEST_F(FastForward, CancelledAmongTheNotificationsMovesNothing)
-{
+    for (const bool isAtOnce : {true, false})
     {
         LogCapture log(git::SeverityProgress);
-        cancelAt(log, *interactor_, "Checkout Notify : ");
+        if (isAtOnce)
+            interactor_->cancel();
+        else
+            cancelAt(log, *interactor_, "Checkout Notify : ");
         const NothingChanges nothing(repository_);
         EXPECT_EQ(failureOfMerge("topic"), cancellation());
+        EXPECT_EQ(git::pendingCallbackException(), nullptr);
+        EXPECT_THAT(interactor_->progress.calls, IsEmpty());
     }
     EXPECT_NO_THROW(merge("topic"));
     EXPECT_EQ(idOf("main"), idOf("topic"));
@@ -202,27 +180,6 @@ TEST_F(FastForward, CancelledWhileItWritesStopsTheNextCheckout)
     repository_.git({"reset", "--quiet", "--hard", "HEAD~1"});
     const NothingChanges nothing(repository_);
     EXPECT_EQ(failureOfMerge("topic"), cancellation());
-}
-
-/// Whatever the host's factory gives.
-TEST_F(FastForward, AlwaysChecksOutSafely)
-{
-    class Factory : public vclink::test::TestOptionsFactory
-    {
-      public:
-        using TestOptionsFactory::TestOptionsFactory;
-        git::CheckoutOptions makeCheckoutOptions() override
-        {
-            git::CheckoutOptions options;
-            options.checkoutStrategy = GIT_CHECKOUT_FORCE;
-            return options;
-        }
-    };
-    git::GitAdapter adapter(vclink::test::asPath(repository_.path()),
-                            std::make_shared<Factory>(interactor_));
-    repository_.write("file", "mine\n");
-    const NothingChanges nothing(repository_);
-    EXPECT_ANY_THROW(git::BranchManager::create(adapter)->merge("topic"));
 }
 
 } // namespace

@@ -21,18 +21,13 @@ namespace
 
 namespace fs = std::filesystem;
 using testing::HasSubstr;
-using testing::IsEmpty;
-using vclink::test::Failure;
-using vclink::test::failureOf;
-using vclink::test::indexStampOf;
-using vclink::test::NothingChanges;
-using vclink::test::stateOf;
+using namespace vclink::test;
 
 constexpr const char *mergeMarker = ".git/vclink-merge";
 constexpr const char *indexLock = ".git/index.lock";
 
 /// A merge whose process was killed, and the commits that follow.
-class InterruptedMerge : public vclink::test::MergeFixture
+class InterruptedMerge : public MergeFixture
 {
   protected:
     void commit() const
@@ -49,7 +44,7 @@ class InterruptedMerge : public vclink::test::MergeFixture
     }
 
     /// Merges "topic" in a process that is killed at this call of the progress display, the first
-    /// of which comes before the first file is written.
+    /// of which comes before the first file is written, and removes the lock that it leaves.
     void killMergeAt(std::size_t call) const
     {
         const pid_t child = ::fork();
@@ -67,6 +62,10 @@ class InterruptedMerge : public vclink::test::MergeFixture
         int status = 0;
         ASSERT_EQ(::waitpid(child, &status, 0), child);
         ASSERT_TRUE(WIFSIGNALED(status)) << "the merge came to its end";
+        EXPECT_EQ(repository_.read(mergeMarker), markerOf("main", "topic"));
+        ASSERT_TRUE(exists(indexLock));
+        EXPECT_EQ(failureOf([this] { commit(); }).code, GIT_ELOCKED);
+        repository_.remove(indexLock);
     }
     void expectRefused() const
     {
@@ -108,8 +107,7 @@ class InterruptedMerge : public vclink::test::MergeFixture
     }
     void run(const std::string &commands) const
     {
-        const auto result =
-            vclink::test::Command({"sh", "-ec", commands}).in(repository_.path()).run();
+        const auto result = Command({"sh", "-ec", commands}).in(repository_.path()).run();
         EXPECT_TRUE(result.succeeded()) << commands;
         EXPECT_EQ(result.errors, "") << commands;
     }
@@ -122,54 +120,34 @@ class KilledMerge : public InterruptedMerge, public testing::WithParamInterface<
     KilledMerge()
     {
         repository_.write("both", "1\n2\n3\n4\n5\n6\n7\n");
-        repository_.write("deleted", "x");
         repository_.write("renamed", "one line\nand another\nand a third\n");
-        repository_.write("untouched", "x");
-        repository_.write("sub/tracked", "x");
-        repository_.write("becomes a file/a", "x");
-        repository_.write("becomes a file/b", "x");
-        repository_.write("becomes a folder", "x");
+        for (const auto *name : {"deleted", "untouched", "sub/tracked", "becomes a file/a",
+                                 "becomes a file/b", "becomes a folder"})
+            repository_.write(name, "x");
         repository_.write(".gitignore", "*.ignored\n");
         repository_.commitAll("more");
-        diverge(
-            [this]
-            {
-                repository_.write("both", "ours\n2\n3\n4\n5\n6\n7\n");
-                repository_.git({"mv", "renamed", "of another name"});
-            },
-            [this]
-            {
-                repository_.write("both", "1\n2\n3\n4\n5\n6\ntheirs\n");
-                repository_.remove("deleted");
-                repository_.write("renamed", "one line\nand another\nand a third\nof theirs\n");
-                repository_.write("file", "theirs\n");
-                repository_.write("new", std::string("\0binary\1", 8));
-                repository_.write("sub/new", "theirs\n");
-                repository_.write("fresh/new", "theirs\n");
-                repository_.remove("becomes a file");
-                repository_.write("becomes a file", "theirs\n");
-                repository_.remove("becomes a folder");
-                repository_.write("becomes a folder/a", "theirs\n");
-                repository_.write("becomes a folder/b", "theirs\n");
-                repository_.write("forced.ignored", "theirs\n");
-                repository_.git({"add", "--force", "forced.ignored"});
-            });
+        diverge(writes("both", "ours\n2\n3\n4\n5\n6\n7\n") + moves("renamed", "of another name"),
+                writes("both", "1\n2\n3\n4\n5\n6\ntheirs\n") + removes("deleted") +
+                    writes("renamed", "one line\nand another\nand a third\nof theirs\n") +
+                    writes("file", "theirs\n") + writes("new", std::string("\0binary\1", 8)) +
+                    writes("sub/new", "theirs\n") + writes("fresh/new", "theirs\n") +
+                    removes("becomes a file") + writes("becomes a file", "theirs\n") +
+                    removes("becomes a folder") + writes("becomes a folder/a", "theirs\n") +
+                    writes("becomes a folder/b", "theirs\n") +
+                    writes("forced.ignored", "theirs\n") +
+                    runsGit({"add", "--force", "forced.ignored"}));
         repository_.write("untracked", "mine");
         repository_.write("sub/untracked", "mine");
         repository_.write("mine.ignored", "mine");
         before_ = stateOf(repository_);
     }
 
-    vclink::test::RepositoryState before_;
+    RepositoryState before_;
 };
 
 TEST_P(KilledMerge, IsNotConcludedByACommit)
 {
     killMergeAt(GetParam());
-    EXPECT_EQ(repository_.read(mergeMarker), markerOf("main", "topic"));
-    ASSERT_TRUE(exists(indexLock));
-    EXPECT_EQ(failureOf([this] { commit(); }).code, GIT_ELOCKED);
-    repository_.remove(indexLock);
     expectRefused();
     repository_.git({"add", "--update"});
     expectRefused();
@@ -178,7 +156,6 @@ TEST_P(KilledMerge, IsNotConcludedByACommit)
 TEST_P(KilledMerge, IsTakenBackByTheCommandsThatTheRefusalNames)
 {
     killMergeAt(GetParam());
-    repository_.remove(indexLock);
     run(wayOut());
     const auto after = stateOf(repository_);
     EXPECT_EQ(after.head, before_.head);
@@ -199,17 +176,13 @@ TEST_P(KilledMerge, IsTakenBackByTheCommandsThatTheRefusalNames)
 TEST_P(KilledMerge, IsTakenBackWithoutWhatWasEditedSince)
 {
     killMergeAt(GetParam());
-    repository_.remove(indexLock);
-    repository_.write("untouched", "edited since\n");
-    repository_.write("file", "edited since, in a file of the merge\n");
-    repository_.write("later", "edited since\n");
-    repository_.write("sub/later", "edited since\n");
+    // The last in a file of the merge.
+    for (const auto *name : {"untouched", "later", "sub/later", "file"})
+        repository_.write(name, "edited since\n");
     run(wayOut());
-    EXPECT_EQ(repository_.read("untouched"), "edited since\n");
-    EXPECT_EQ(repository_.read("later"), "edited since\n");
-    EXPECT_EQ(repository_.read("sub/later"), "edited since\n");
-    EXPECT_EQ(repository_.git({"show", "stash@{0}:file"}),
-              "edited since, in a file of the merge\n");
+    for (const auto *name : {"untouched", "later", "sub/later"})
+        EXPECT_EQ(repository_.read(name), "edited since\n") << name;
+    EXPECT_EQ(repository_.git({"show", "stash@{0}:file"}), "edited since\n");
     EXPECT_EQ(repository_.git({"status", "--porcelain", "--untracked-files=no"}), " M untouched\n");
     commit();
     merge("topic");
@@ -223,7 +196,6 @@ TEST_F(InterruptedMerge, OfConflictsOnlyIsNotConcludedByACommit)
 {
     diverge(writing("file", "ours\n"), writing("file", "theirs\n"));
     killMergeAt(1);
-    repository_.remove(indexLock);
     expectRefused();
     run(wayOut());
     expectConflicts("topic");
@@ -253,7 +225,6 @@ TEST_F(InterruptedMerge, IsNotConcludedOnAnotherBranchEither)
     makeDiverged();
     makeBranch("third", writing("third", "x"), "main^");
     killMergeAt(2);
-    repository_.remove(indexLock);
     repository_.git({"symbolic-ref", "HEAD", "refs/heads/third"});
     repository_.git({"reset", "--quiet", "--", "."});
     expectRefused();
@@ -266,7 +237,6 @@ TEST_F(InterruptedMerge, IsOverOnceGitHasAbortedIt)
 {
     diverge(writing("file", "ours\n"), writing("file", "theirs\n"));
     killMergeAt(1);
-    repository_.remove(indexLock);
     repository_.git({"merge", "--abort"});
     repository_.tryGit({"merge", "topic"});
     repository_.git({"checkout", "--quiet", "--ours", "file"});
@@ -282,7 +252,6 @@ TEST_F(InterruptedMerge, IsNotHiddenByWhatGitLeftOfAnEarlierOne)
     ASSERT_TRUE(exists(".git/AUTO_MERGE"));
     commit();
     killMergeAt(1);
-    repository_.remove(indexLock);
     expectRefused();
 }
 
@@ -290,7 +259,6 @@ TEST_F(InterruptedMerge, OfNoDifferenceLacksNothing)
 {
     diverge(writing("file", "same\n"), writing("file", "same\n"));
     killMergeAt(1);
-    repository_.remove(indexLock);
     expectConcluded();
 }
 
@@ -332,17 +300,13 @@ TEST_F(InterruptedMerge, StandsInItsMarkerWhileFilesAreWritten)
     merge("topic");
     EXPECT_GT(calls, 0U);
     EXPECT_FALSE(exists(mergeMarker));
-}
-
-TEST_F(InterruptedMerge, OfConflictsLeavesNoMarker)
-{
-    diverge(writing("file", "ours\n"), writing("file", "theirs\n"));
-    expectConflicts("topic");
+    interactor_->progress.onCall = nullptr;
+    makeBranch("conflict", writing("file", "theirs\n"));
+    repository_.write("file", "ours\n");
+    repository_.commitAll("ours");
+    expectConflicts("conflict");
     EXPECT_FALSE(exists(mergeMarker));
     EXPECT_FALSE(exists(indexLock));
-    repository_.write("file", "ours\n");
-    repository_.add({"file"});
-    expectConcluded();
 }
 
 TEST_F(InterruptedMerge, ByAnotherProgramIsToldByItsIndex)
@@ -353,15 +317,6 @@ TEST_F(InterruptedMerge, ByAnotherProgramIsToldByItsIndex)
     run(wayOut());
     merge("topic");
     EXPECT_EQ(parents().size(), 2U);
-}
-
-TEST_F(InterruptedMerge, ByAnotherProgramIsToldByADeletionOrAMode)
-{
-    diverge(writing("ours", "x"), [this] { repository_.remove("other"); });
-    beginMergeAsLibGit2();
-    expectRefusedForItsIndex();
-    repository_.git({"rm", "--quiet", "other"});
-    expectConcluded();
 }
 
 TEST_F(InterruptedMerge, ByAnotherProgramHasNothingInCommon)
@@ -375,26 +330,29 @@ TEST_F(InterruptedMerge, ByAnotherProgramHasNothingInCommon)
     expectRefusedForItsIndex();
 }
 
-TEST_F(InterruptedMerge, IsNoneWhereTheIndexHasSomeOfTheirs)
+/// One that git began, one whose index has some of theirs, and one whose conflicts were all
+/// resolved to ours.
+TEST_F(InterruptedMerge, IsNoneOfThese)
 {
-    makeDiverged();
+    diverge(writes("file", "ours\n"),
+            writes("file", "theirs\n") + writes("theirs", "x") + removes("other"));
+    const std::string ours = idOf("main");
+    const std::vector<Change> merges{writes(".git/MERGE_MODE", ""),
+                                     runsGit({"checkout", "--quiet", "topic", "--", "theirs"}),
+                                     runsGit({"rm", "--quiet", "other"})};
+    for (const auto &change : merges)
+    {
+        beginMergeAsLibGit2();
+        expectRefusedForItsIndex();
+        change(repository_);
+        expectConcluded();
+        repository_.git({"reset", "--quiet", "--hard", ours});
+    }
+    repository_.git({"checkout", "--quiet", "-B", "topic", "main^"});
+    repository_.write("file", "theirs\n");
+    repository_.commitAll("in conflict only");
+    repository_.git({"checkout", "--quiet", "main"});
     beginMergeAsLibGit2();
-    repository_.git({"checkout", "--quiet", "topic", "--", "theirs"});
-    expectConcluded();
-}
-
-TEST_F(InterruptedMerge, IsNoneWhereAllConflictsWereResolvedToOurs)
-{
-    diverge(writing("file", "ours\n"), writing("file", "theirs\n"));
-    beginMergeAsLibGit2();
-    expectConcluded();
-}
-
-TEST_F(InterruptedMerge, IsNoneOfGit)
-{
-    makeDiverged();
-    repository_.write(".git/MERGE_HEAD", idOf("topic") + "\n");
-    repository_.write(".git/MERGE_MODE", "");
     expectConcluded();
 }
 

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include <memory>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include <gtest/gtest.h>
@@ -30,58 +31,44 @@ class NotingAdapter : public vclink::git::GitAdapter
 /// What a merge commit says.
 class MergeCommit : public vclink::test::MergeFixture
 {
+  protected:
+    MergeCommit()
+    {
+        makeDiverged();
+    }
 };
 
-TEST_F(MergeCommit, NamesTheBranchInItsMessage)
+TEST_F(MergeCommit, NamesWhateverIsAReferenceAsABranchAndAnyOtherRevisionAsACommit)
 {
-    diverge(writing("ours", "x"), writing("theirs", "x"));
-    merge("topic");
-    EXPECT_EQ(message(), "Merge branch 'topic'");
-}
-
-TEST_F(MergeCommit, NamesWhateverIsAReferenceAsABranch)
-{
-    diverge(writing("ours", "x"), writing("theirs", "x"));
-    repository_.git({"tag", "light", "topic"});
-    repository_.git({"update-ref", "refs/remotes/origin/topic", "topic"});
+    repository_.git({"-c", "user.name=x", "-c", "user.email=x@y", "tag", "-a", "-m", "m",
+                     "annotated", "topic"});
+    for (const std::string reference :
+         {"refs/tags/light", "refs/remotes/origin/far",
+          "refs/heads/gr\xC3\xBC\xC3\x9F/\xF0\x9F\x8C\xB3", "refs/heads/caf\xE9"})
+        repository_.git({"update-ref", reference, "topic"});
     const std::string base = idOf("main");
-    for (const std::string name : {"light", "origin/topic", "refs/heads/topic"})
+    const std::vector<std::pair<std::string, std::vector<std::string>>> kinds{
+        {"branch",
+         {"topic", "refs/heads/topic", "light", "origin/far", "gr\xC3\xBC\xC3\x9F/\xF0\x9F\x8C\xB3",
+          "caf\xE9"}},
+        {"commit",
+         {idOf("topic"), idOf("topic").substr(0, 7), "topic^0", "topic^{commit}",
+          "annotated^{commit}"}}};
+    for (const auto &[kind, names] : kinds)
     {
-        merge(name);
-        EXPECT_EQ(message(), "Merge branch '" + name + "'");
-        repository_.git({"reset", "--quiet", "--hard", base});
-    }
-}
-
-TEST_F(MergeCommit, NamesTheCommitInItsMessage)
-{
-    diverge(writing("ours", "x"), writing("theirs", "x"));
-    const std::string base = idOf("main");
-    for (const std::string &name :
-         {idOf("topic"), idOf("topic").substr(0, 8), std::string("topic^0")})
-    {
-        merge(name);
-        EXPECT_EQ(message(), "Merge commit '" + name + "'");
-        repository_.git({"reset", "--quiet", "--hard", base});
-    }
-}
-
-TEST_F(MergeCommit, NamesABranchThatIsNoAsciiOrNoUtf8)
-{
-    diverge(writing("ours", "x"), writing("theirs", "x"));
-    const std::string base = idOf("main");
-    for (const std::string name : {"gr\xC3\xBC\xC3\x9F/\xF0\x9F\x8C\xB3", "caf\xE9"})
-    {
-        repository_.git({"branch", name, "topic"});
-        merge(name);
-        EXPECT_EQ(message(), "Merge branch '" + name + "'");
-        repository_.git({"reset", "--quiet", "--hard", base});
+        for (const auto &name : names)
+        {
+            SCOPED_TRACE(name);
+            merge(name);
+            EXPECT_EQ(message(), "Merge " + kind + " '" + name + "'");
+            EXPECT_EQ(parents(), (std::vector<std::string>{base, idOf("topic")}));
+            repository_.git({"reset", "--quiet", "--hard", base});
+        }
     }
 }
 
 TEST_F(MergeCommit, IsMadeByTheAdaptersOwnOperation)
 {
-    diverge(writing("ours", "x"), writing("theirs", "x"));
     NotingAdapter adapter(vclink::test::asPath(repository_.path()),
                           std::static_pointer_cast<vclink::ApplicationInteractor>(interactor_));
     vclink::git::BranchManager::create(adapter)->merge("topic");
@@ -91,7 +78,6 @@ TEST_F(MergeCommit, IsMadeByTheAdaptersOwnOperation)
 
 TEST_F(MergeCommit, IsCommittedByThePersonOfTheConfiguration)
 {
-    diverge(writing("ours", "x"), writing("theirs", "x"));
     merge("topic");
     EXPECT_EQ(repository_.line({"log", "-1", "--format=%an <%ae> %cn <%ce>"}),
               "Test Person <person@example.com> Test Person <person@example.com>");

@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: MIT
 #include <string>
+#include <utility>
 #include <vector>
 
 #include <git2.h>
@@ -15,17 +16,12 @@ using testing::Contains;
 using testing::ElementsAre;
 using testing::IsEmpty;
 using testing::Not;
-using vclink::test::Failure;
-using vclink::test::failureOf;
-using vclink::test::GitRepository;
-using vclink::test::linesOf;
-using vclink::test::NothingChanges;
-using vclink::test::stateOf;
+using namespace vclink::test;
 
 const std::string missingMergeHead = "1234567890123456789012345678901234567890";
 
 /// A commit that ends a merge which is under way, and what becomes of the conflicts in it.
-class MergeConclusion : public vclink::test::CommitFixture
+class MergeConclusion : public CommitFixture
 {
   protected:
     /// Makes a branch off main whose commit adds one file of the same name.
@@ -54,11 +50,6 @@ class MergeConclusion : public vclink::test::CommitFixture
         EXPECT_THAT(underWay, IsEmpty());
         EXPECT_EQ(repository_.git({"status"}).find("merging"), std::string::npos);
     }
-    void expectFailure(const Failure &failure) const
-    {
-        const NothingChanges nothing(repository_);
-        EXPECT_EQ(failureOf([this] { commit(); }), failure);
-    }
 };
 
 TEST_F(MergeConclusion, HasTheMergeHeadAsItsSecondParent)
@@ -73,23 +64,19 @@ TEST_F(MergeConclusion, HasTheMergeHeadAsItsSecondParent)
     EXPECT_EQ(repository_.git({"fsck", "--strict", "--no-dangling"}), "");
 }
 
-TEST_F(MergeConclusion, OfTwoHeadsHasThreeParentsInTheirOrder)
+TEST_F(MergeConclusion, OfTwoHeadsHasThreeParentsInTheOrderOfTheMergeHeads)
 {
     beginCleanMerge({"one", "two"});
     const std::string head = idOf("HEAD");
-    commit();
-    EXPECT_THAT(parents(), ElementsAre(head, idOf("one"), idOf("two")));
-    EXPECT_THAT(namesIn(), ElementsAre("file", "one", "other", "ours", "sub/inside", "two"));
-    expectNothingUnderWay();
-}
-
-TEST_F(MergeConclusion, FollowsTheOrderOfTheMergeHeads)
-{
-    beginCleanMerge({"one", "two"});
-    const std::string head = idOf("HEAD");
-    repository_.write(".git/MERGE_HEAD", idOf("two") + '\n' + idOf("one") + '\n');
-    commit();
-    EXPECT_THAT(parents(), ElementsAre(head, idOf("two"), idOf("one")));
+    for (const auto &[first, second] : {std::pair("one", "two"), std::pair("two", "one")})
+    {
+        repository_.write(".git/MERGE_HEAD", idOf(first) + '\n' + idOf(second) + '\n');
+        commit();
+        EXPECT_THAT(parents(), ElementsAre(head, idOf(first), idOf(second)));
+        EXPECT_THAT(namesIn(), ElementsAre("file", "one", "other", "ours", "sub/inside", "two"));
+        expectNothingUnderWay();
+        repository_.git({"reset", "--quiet", "--soft", head});
+    }
 }
 
 TEST_F(MergeConclusion, HoldsWhatChangedSinceTheMergeBegan)
@@ -138,50 +125,35 @@ TEST_F(MergeConclusion, InALinkedWorktreeEndsThatOnesMerge)
     EXPECT_THAT(stateOf(worktree).underWay, Not(Contains(testing::Key("MERGE_HEAD"))));
 }
 
-TEST_F(MergeConclusion, TakesAFileInConflictAsItStands)
+TEST_F(MergeConclusion, TakesFilesInConflictAsTheyStand)
 {
-    beginMerge({"file"});
+    beginMerge({"file", "sub/inside"});
     const std::string head = idOf("HEAD");
-    const std::string standing = repository_.read("file");
-    ASSERT_NE(standing.find("<<<<<<<"), std::string::npos);
+    repository_.write("file", "merged\n");
+    const std::string standing = repository_.read("sub/inside");
+    ASSERT_NE(standing.find(">>>>>>> theirs"), std::string::npos);
     commit();
-    EXPECT_EQ(committed("file"), standing);
-    EXPECT_EQ(repository_.read("file"), standing);
+    EXPECT_EQ(committed("file"), "merged\n");
+    EXPECT_EQ(committed("sub/inside"), standing);
+    EXPECT_EQ(repository_.read("sub/inside"), standing);
     EXPECT_THAT(parents(), ElementsAre(head, idOf("theirs")));
     EXPECT_EQ(repository_.git({"ls-files", "--unmerged"}), "");
     EXPECT_THAT(status(), IsEmpty());
     expectNothingUnderWay();
 }
 
-TEST_F(MergeConclusion, TakesAFileWhoseMarkersWereEditedAwayAsItStands)
-{
-    beginMerge({"file", "sub/inside"});
-    repository_.write("file", "merged\n");
-    commit();
-    EXPECT_EQ(committed("file"), "merged\n");
-    EXPECT_NE(committed("sub/inside").find(">>>>>>> theirs"), std::string::npos);
-    EXPECT_EQ(repository_.git({"ls-files", "--unmerged"}), "");
-}
-
 /// libgit2 takes it as deleted, all stages of it.
-TEST_F(MergeConclusion, DropsAConflictWhereNoFileStands)
+TEST_F(MergeConclusion, DropsAConflictWhereNoFileOrAFolderStands)
 {
     beginMerge({"file", "other"});
     repository_.remove("file");
+    repository_.remove("other");
+    repository_.write("other/new", "x");
     commit();
-    EXPECT_THAT(namesIn(), ElementsAre("other", "sub/inside"));
-    EXPECT_EQ(repository_.git({"ls-files"}), "other\nsub/inside\n");
+    EXPECT_THAT(namesIn(), ElementsAre("sub/inside"));
+    EXPECT_EQ(repository_.git({"ls-files"}), "sub/inside\n");
+    EXPECT_THAT(status(), ElementsAre("?? other/new"));
     expectNothingUnderWay();
-}
-
-TEST_F(MergeConclusion, DropsAConflictWhereAFolderStands)
-{
-    beginMerge({"file"});
-    repository_.remove("file");
-    repository_.write("file/new", "x");
-    commit();
-    EXPECT_THAT(namesIn(), ElementsAre("other", "sub/inside"));
-    EXPECT_THAT(status(), ElementsAre("?? file/new"));
 }
 
 TEST_F(MergeConclusion, TakesTheirFileThatWeDeletedWhereItStands)
@@ -219,49 +191,30 @@ TEST_F(MergeConclusion, DropsAConflictOfOneStageWhereNoFileStands)
     }
 }
 
-TEST_F(MergeConclusion, FailsWithGarbageForAMergeHead)
+TEST_F(MergeConclusion, FailsWithAMergeHeadThatIsNone)
 {
     beginMerge({"file"});
-    repository_.write(".git/MERGE_HEAD", "garbage\n");
-    expectFailure({GIT_ERROR, GIT_ERROR_INVALID, "unable to parse OID - invalid length"});
-}
-
-TEST_F(MergeConclusion, FailsWithGarbageAfterAGoodMergeHead)
-{
-    beginMerge({"file"});
-    repository_.write(".git/MERGE_HEAD", idOf("theirs") + "\ngarbage\n");
-    expectFailure({GIT_ERROR, GIT_ERROR_INVALID, "unable to parse OID - invalid length"});
-}
-
-TEST_F(MergeConclusion, FailsWithAMergeHeadThatIsCutShort)
-{
-    beginMerge({"file"});
-    repository_.write(".git/MERGE_HEAD", idOf("theirs"));
-    expectFailure({GIT_ERROR, GIT_ERROR_MERGE, "no EOL at line 1"});
-}
-
-TEST_F(MergeConclusion, FailsWithAMergeHeadWhoseCommitIsMissing)
-{
-    beginMerge({"file"});
-    repository_.write(".git/MERGE_HEAD", missingMergeHead + '\n');
-    expectFailure({GIT_ENOTFOUND, GIT_ERROR_ODB,
-                   "object not found - no match for id (" + missingMergeHead + ")"});
-}
-
-TEST_F(MergeConclusion, FailsWithAMissingSecondMergeHead)
-{
-    beginMerge({"file"});
-    repository_.write(".git/MERGE_HEAD", idOf("theirs") + '\n' + missingMergeHead + '\n');
-    expectFailure({GIT_ENOTFOUND, GIT_ERROR_ODB,
-                   "object not found - no match for id (" + missingMergeHead + ")"});
-}
-
-TEST_F(MergeConclusion, FailsWithAMergeHeadThatIsNoCommit)
-{
-    beginMerge({"file"});
-    repository_.write(".git/MERGE_HEAD", idOf("HEAD:other") + '\n');
-    expectFailure({GIT_ENOTFOUND, GIT_ERROR_INVALID,
-                   "the requested type does not match the type in the ODB"});
+    const std::string theirs = idOf("theirs");
+    const Failure garbage{GIT_ERROR, GIT_ERROR_INVALID, "unable to parse OID - invalid length"};
+    const Failure missing{GIT_ENOTFOUND, GIT_ERROR_ODB,
+                          "object not found - no match for id (" + missingMergeHead + ")"};
+    const Failure cutShort{GIT_ERROR, GIT_ERROR_MERGE, "no EOL at line 1"};
+    const Failure noCommit{GIT_ENOTFOUND, GIT_ERROR_INVALID,
+                           "the requested type does not match the type in the ODB"};
+    const std::vector<std::pair<std::string, Failure>> heads{
+        {"garbage\n", garbage},
+        {theirs + "\ngarbage\n", garbage},
+        {theirs, cutShort},
+        {missingMergeHead + '\n', missing},
+        {theirs + '\n' + missingMergeHead + '\n', missing},
+        {idOf("HEAD:other") + '\n', noCommit}};
+    for (const auto &[content, failure] : heads)
+    {
+        SCOPED_TRACE(content);
+        repository_.write(".git/MERGE_HEAD", content);
+        const NothingChanges nothing(repository_);
+        EXPECT_EQ(failureOf([this] { commit(); }), failure);
+    }
 }
 
 TEST_F(MergeConclusion, FailsWithAMergeHeadThatCannotBeRead)
@@ -270,13 +223,13 @@ TEST_F(MergeConclusion, FailsWithAMergeHeadThatCannotBeRead)
     giveAway();
     const std::string file = repository_ / ".git/MERGE_HEAD";
     const auto before = stateOf(repository_);
-    const auto index = vclink::test::indexStampOf(repository_);
+    const auto index = indexStampOf(repository_);
     repository_.setMode(".git/MERGE_HEAD", 0000);
     EXPECT_EQ(commitAsItsOwner(),
               "-14 2 failed open - '" + file + "' is locked: Permission denied");
     repository_.setMode(".git/MERGE_HEAD", 0644);
     EXPECT_EQ(stateOf(repository_), before);
-    EXPECT_EQ(vclink::test::indexStampOf(repository_), index);
+    EXPECT_EQ(indexStampOf(repository_), index);
 }
 
 TEST_F(MergeConclusion, TakesNoParentFromAnEmptyMergeHead)

@@ -12,10 +12,10 @@ namespace
 
 using testing::ElementsAre;
 using testing::IsEmpty;
-using vclink::test::asPath;
+using namespace vclink::test;
 
 /// Conflicts resolved by the host's own operations.
-class MergeConflictsResolved : public vclink::test::MergeFixture
+class MergeConflictsResolved : public MergeFixture
 {
   protected:
     MergeConflictsResolved()
@@ -23,20 +23,9 @@ class MergeConflictsResolved : public vclink::test::MergeFixture
         repository_.write(".gitattributes", "binary -merge\n");
         repository_.write("binary", "ancestor\n");
         repository_.commitAll("attributes");
-        diverge(
-            [this]
-            {
-                repository_.write("file", "ours\n");
-                repository_.write("binary", "ours\n");
-                repository_.remove("other");
-            },
-            [this]
-            {
-                repository_.write("file", "theirs\n");
-                repository_.write("binary", "theirs\n");
-                repository_.write("other", "theirs\n");
-                repository_.write("new", "x");
-            });
+        diverge(writes("file", "ours\n") + writes("binary", "ours\n") + removes("other"),
+                writes("file", "theirs\n") + writes("binary", "theirs\n") +
+                    writes("other", "theirs\n") + writes("new", "x"));
         expectConflicts("topic");
     }
     void markResolved(const std::string &name) const
@@ -45,15 +34,14 @@ class MergeConflictsResolved : public vclink::test::MergeFixture
     }
 };
 
-TEST_F(MergeConflictsResolved, AreCommittedWithBothParents)
+TEST_F(MergeConflictsResolved, AreCommittedWithBothParentsAndLetTheNextMergeBegin)
 {
     const std::string ours = idOf("HEAD");
     repository_.write("file", "both\n");
     repository_.write("binary", "theirs\n");
     repository_.remove("other");
-    markResolved("file");
-    markResolved("binary");
-    markResolved("other");
+    for (const auto *name : {"file", "binary", "other"})
+        markResolved(name);
     EXPECT_THAT(conflicts(), IsEmpty());
     EXPECT_EQ(branches().getRepositoryState(), "Conflicts");
     adapter_->commit(upath(), u"by hand");
@@ -65,27 +53,19 @@ TEST_F(MergeConflictsResolved, AreCommittedWithBothParents)
               ".gitattributes\nbinary\nfile\nnew\n");
     EXPECT_EQ(repository_.git({"cat-file", "blob", "HEAD:file"}), "both\n");
     EXPECT_EQ(repository_.git({"fsck", "--strict", "--no-dangling"}), "");
+    makeBranch("second", [this] { repository_.write("second", "x"); });
+    EXPECT_NO_THROW(merge("second"));
+    EXPECT_NO_THROW(merge("topic")) << "up to date";
 }
 
 TEST_F(MergeConflictsResolved, AreStatesThatTheAdapterTells)
 {
     auto states = allStates(repository_);
-    EXPECT_EQ(states["file"], "InConflict");
-    EXPECT_EQ(states["binary"], "InConflict");
-    EXPECT_EQ(states["other"], "InConflict");
+    for (const auto *name : {"file", "binary", "other"})
+        EXPECT_EQ(states[name], "InConflict") << name;
     EXPECT_EQ(states["new"], "Added");
     markResolved("file");
     EXPECT_NE(allStates(repository_)["file"], "InConflict");
-}
-
-TEST_F(MergeConflictsResolved, LetTheNextMergeBegin)
-{
-    for (const auto *name : {"file", "binary", "other"})
-        markResolved(name);
-    adapter_->commit(upath(), u"by hand");
-    makeBranch("second", [this] { repository_.write("second", "x"); });
-    EXPECT_NO_THROW(merge("second"));
-    EXPECT_NO_THROW(merge("topic")) << "up to date";
 }
 
 } // namespace

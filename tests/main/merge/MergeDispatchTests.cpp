@@ -7,8 +7,7 @@
 #include <gtest/gtest.h>
 
 #include "MergeFixture.hpp"
-#include "support/Descriptors.hpp"
-#include "support/LogCapture.hpp"
+#include "support/Sentence.hpp"
 #include "vclink/git/messageIdentifiers.hpp"
 
 namespace
@@ -17,19 +16,16 @@ namespace
 namespace git = vclink::git;
 using testing::ElementsAre;
 using testing::IsEmpty;
-using vclink::test::GitRepository;
-using vclink::test::LogCapture;
-using vclink::test::NothingChanges;
-using vclink::test::textOf;
+using namespace vclink::test;
 
 /// Which kind of merge is made of what is possible and what `merge.ff` prefers.
-class MergeDispatch : public vclink::test::MergeFixture
+class MergeDispatch : public MergeFixture
 {
   protected:
-    void expectNothingHappens(const std::string &name) const
+    void tag(const std::string &name, const std::string &message) const
     {
-        const NothingChanges nothing(repository_);
-        EXPECT_NO_THROW(merge(name));
+        repository_.git({"-c", "user.name=x", "-c", "user.email=x@y", "tag", "-a", "-m", message,
+                         name, "topic"});
     }
     /// Expects HEAD at the branch, with no new commit, as git has it.
     void expectFastForward()
@@ -40,16 +36,6 @@ class MergeDispatch : public vclink::test::MergeFixture
         EXPECT_EQ(currentBranch(), "refs/heads/main");
         EXPECT_THAT(status(), IsEmpty());
     }
-    /// Expects a new commit with two parents, as git has it.
-    void expectMergeCommit()
-    {
-        const std::string ours = idOf("main");
-        expectAsGit();
-        EXPECT_THAT(parents(), ElementsAre(ours, idOf("topic")));
-        EXPECT_EQ(currentBranch(), "refs/heads/main");
-        EXPECT_THAT(status(), IsEmpty());
-        EXPECT_EQ(branches().getRepositoryState(), "Normal");
-    }
     void expectOnlyFastForwardIsAllowed() const
     {
         const NothingChanges nothing(repository_);
@@ -58,15 +44,65 @@ class MergeDispatch : public vclink::test::MergeFixture
     }
 };
 
-TEST_F(MergeDispatch, UpToDateDoesNothing)
+enum class MergeKind
+{
+    FastForward,
+    MergeCommit,
+    Refused
+};
+
+/// What `merge.ff` says of a branch that is ahead, and of one that has diverged.
+struct Preference : Sentence
+{
+    const char *value;
+    MergeKind ahead;
+    MergeKind diverged;
+};
+
+class MergePreference : public MergeDispatch, public testing::WithParamInterface<Preference>
+{
+  protected:
+    void expect(MergeKind kind)
+    {
+        if (GetParam().value != nullptr)
+            prefer(GetParam().value);
+        if (kind == MergeKind::FastForward)
+            expectFastForward();
+        else if (kind == MergeKind::MergeCommit)
+        {
+            expectCleanAsGit();
+            EXPECT_EQ(currentBranch(), "refs/heads/main");
+        }
+        else
+            expectOnlyFastForwardIsAllowed();
+    }
+};
+
+TEST_P(MergePreference, DecidesOfABranchThatIsAhead)
 {
     makeAhead();
-    repository_.git({"merge", "--quiet", "topic"});
-    expectNothingHappens("topic");
-    expectNothingHappens("main");
-    expectNothingHappens("HEAD");
-    expectNothingHappens("HEAD~1");
+    expect(GetParam().ahead);
 }
+
+TEST_P(MergePreference, DecidesOfABranchThatHasDiverged)
+{
+    makeDiverged();
+    expect(GetParam().diverged);
+}
+
+/// A word that means nothing counts as none.
+const Preference preferences[]{
+    {{"Missing"}, nullptr, MergeKind::FastForward, MergeKind::MergeCommit},
+    {{"Banana"}, "banana", MergeKind::FastForward, MergeKind::MergeCommit},
+    {{"True"}, "true", MergeKind::FastForward, MergeKind::MergeCommit},
+    {{"Yes"}, "yes", MergeKind::FastForward, MergeKind::MergeCommit},
+    {{"False"}, "false", MergeKind::MergeCommit, MergeKind::MergeCommit},
+    {{"Zero"}, "0", MergeKind::MergeCommit, MergeKind::MergeCommit},
+    {{"Only"}, "only", MergeKind::FastForward, MergeKind::Refused},
+};
+
+INSTANTIATE_TEST_SUITE_P(Of, MergePreference, testing::ValuesIn(preferences),
+                         testing::PrintToStringParamName());
 
 TEST_F(MergeDispatch, UpToDateDoesNothingWhateverIsPreferred)
 {
@@ -75,63 +111,10 @@ TEST_F(MergeDispatch, UpToDateDoesNothingWhateverIsPreferred)
     for (const auto *value : {"true", "false", "only"})
     {
         prefer(value);
-        expectNothingHappens("topic");
+        const NothingChanges nothing(repository_);
+        for (const auto *name : {"topic", "main", "HEAD", "HEAD~1"})
+            EXPECT_NO_THROW(merge(name));
     }
-}
-
-TEST_F(MergeDispatch, AheadFastForwardsWithoutAPreference)
-{
-    makeAhead();
-    expectFastForward();
-}
-
-TEST_F(MergeDispatch, AheadFastForwardsWhenThatIsPreferred)
-{
-    makeAhead();
-    prefer("true");
-    expectFastForward();
-}
-
-TEST_F(MergeDispatch, AheadFastForwardsWhenOnlyThatIsAllowed)
-{
-    makeAhead();
-    prefer("only");
-    expectFastForward();
-}
-
-TEST_F(MergeDispatch, AheadMakesAMergeCommitWhenFastForwardsAreNotWanted)
-{
-    makeAhead();
-    prefer("false");
-    expectMergeCommit();
-    EXPECT_EQ(message(), "Merge branch 'topic'");
-}
-
-TEST_F(MergeDispatch, DivergedMakesAMergeCommitWithoutAPreference)
-{
-    makeDiverged();
-    expectMergeCommit();
-}
-
-TEST_F(MergeDispatch, DivergedMakesAMergeCommitWhenFastForwardsArePreferred)
-{
-    makeDiverged();
-    prefer("true");
-    expectMergeCommit();
-}
-
-TEST_F(MergeDispatch, DivergedMakesAMergeCommitWhenFastForwardsAreNotWanted)
-{
-    makeDiverged();
-    prefer("false");
-    expectMergeCommit();
-}
-
-TEST_F(MergeDispatch, DivergedIsRefusedWhenOnlyFastForwardsAreAllowed)
-{
-    makeDiverged();
-    prefer("only");
-    expectOnlyFastForwardIsAllowed();
 }
 
 TEST_F(MergeDispatch, ThePreferenceMayStandInTheUsersFile)
@@ -143,136 +126,57 @@ TEST_F(MergeDispatch, ThePreferenceMayStandInTheUsersFile)
     EXPECT_NO_THROW(merge("topic"));
 }
 
-/// Yes and on mean true, a word that means nothing counts as none.
-TEST_F(MergeDispatch, ThePreferenceMayBeSpeltInOtherWords)
-{
-    makeAhead();
-    prefer("0");
-    expectMergeCommit();
-    repository_.git({"reset", "--quiet", "--hard", "HEAD~1"});
-    prefer("yes");
-    EXPECT_NO_THROW(merge("topic"));
-    EXPECT_EQ(idOf("main"), idOf("topic"));
-}
-
-TEST_F(MergeDispatch, AWordThatMeansNothingIsNoPreference)
-{
-    makeAhead();
-    prefer("banana");
-    EXPECT_NO_THROW(merge("topic"));
-    EXPECT_EQ(idOf("main"), idOf("topic"));
-}
-
-TEST_F(MergeDispatch, AnUnbornBranchIsRefused)
+TEST_F(MergeDispatch, AnUnbornBranchIsRefusedWhateverIsPreferred)
 {
     repository_.git({"checkout", "--quiet", "--orphan", "unborn"});
     repository_.git({"rm", "-r", "--quiet", "--force", "."});
+    for (const auto *value : {"true", "only"})
     {
+        prefer(value);
         const NothingChanges nothing(repository_);
         EXPECT_EQ(failureOfMerge("main"), "GIT_MERGE_ANALYSIS_UNBORN");
     }
-    prefer("only");
-    const NothingChanges nothing(repository_);
-    EXPECT_EQ(failureOfMerge("main"), "GIT_MERGE_ANALYSIS_UNBORN");
 }
 
-TEST_F(MergeDispatch, ADetachedHeadFastForwards)
+TEST_F(MergeDispatch, ADetachedHeadMovesAlone)
 {
     makeAhead();
+    makeBranch("other", [this] { repository_.write("ours", "x"); });
     repository_.git({"checkout", "--quiet", "--detach"});
     const std::string main = idOf("main");
     expectAsGit();
     EXPECT_EQ(idOf("HEAD"), idOf("topic"));
+    expectAsGit("other");
+    EXPECT_THAT(parents(), ElementsAre(idOf("topic"), idOf("other")));
     EXPECT_EQ(idOf("main"), main);
     EXPECT_EQ(currentBranch(), "");
 }
 
-TEST_F(MergeDispatch, ADetachedHeadTakesAMergeCommit)
+TEST_F(MergeDispatch, TakesALongCommitInEitherWay)
 {
-    makeDiverged();
-    repository_.git({"checkout", "--quiet", "--detach"});
-    const std::string main = idOf("main");
-    expectAsGit();
-    EXPECT_THAT(parents(), ElementsAre(main, idOf("topic")));
-    EXPECT_EQ(idOf("main"), main);
-    EXPECT_EQ(currentBranch(), "");
-}
-
-TEST_F(MergeDispatch, TakesAnyRevisionText)
-{
-    makeDiverged();
-    repository_.git({"tag", "light", "topic"});
-    repository_.git({"-c", "user.name=x", "-c", "user.email=x@y", "tag", "-a", "-m", "m",
-                     "annotated", "topic"});
-    repository_.git({"update-ref", "refs/remotes/origin/topic", "topic"});
-    const std::string base = idOf("main");
-    for (const std::string &name :
-         {std::string("light"), std::string("origin/topic"), std::string("refs/heads/topic"),
-          idOf("topic"), idOf("topic").substr(0, 7), std::string("topic^0"),
-          std::string("topic^{commit}"), std::string("annotated^{commit}")})
-    {
-        EXPECT_NO_THROW(merge(name)) << name;
-        EXPECT_THAT(parents(), ElementsAre(base, idOf("topic"))) << name;
-        repository_.git({"reset", "--quiet", "--hard", base});
-    }
+    repository_.git({"checkout", "--quiet", "-b", "topic"});
+    repository_.write("new", "x");
+    repository_.commitAll(std::string(9000, 'x'));
+    repository_.git({"checkout", "--quiet", "main"});
+    expectFastForward();
+    repository_.git({"reset", "--quiet", "--hard", "HEAD~1"});
+    repository_.write("ours", "x");
+    repository_.commitAll(std::string(9000, 'y'));
+    expectCleanAsGit();
 }
 
 /// The look-up of the commit does not peel a tag; git does.
-TEST_F(MergeDispatch, RefusesAnAnnotatedTagItself)
+TEST_F(MergeDispatch, RefusesAnAnnotatedTagOrAFileByItsRightId)
 {
     makeDiverged();
-    repository_.git({"-c", "user.name=x", "-c", "user.email=x@y", "tag", "-a", "-m", "m",
-                     "annotated", "topic"});
+    tag("annotated", "m");
+    tag("long", std::string(9000, 'x'));
     const NothingChanges nothing(repository_);
-    EXPECT_EQ(
-        failureOfMerge("annotated"),
-        textOf(vclink::test::Failure{GIT_ENOTFOUND, GIT_ERROR_INVALID,
-                                     "the requested type does not match the type in the ODB"}));
-}
-
-TEST_F(MergeDispatch, TakesALongCommitAndNamesItRight)
-{
-    repository_.git({"checkout", "--quiet", "-b", "topic"});
-    repository_.write("new", "x");
-    repository_.commitAll(std::string(9000, 'x'));
-    const std::string target = idOf("topic");
-    repository_.git({"checkout", "--quiet", "main"});
-    EXPECT_NO_THROW(merge("topic"));
-    EXPECT_EQ(idOf("main"), target);
-}
-
-TEST_F(MergeDispatch, TakesALongCommitIntoAMergeCommit)
-{
-    repository_.git({"checkout", "--quiet", "-b", "topic"});
-    repository_.write("new", "x");
-    repository_.commitAll(std::string(9000, 'x'));
-    repository_.git({"checkout", "--quiet", "main"});
-    repository_.write("ours", "x");
-    repository_.commitAll(std::string(9000, 'y'));
-    expectMergeCommit();
-}
-
-TEST_F(MergeDispatch, RefusesALongTagByItsRightId)
-{
-    makeDiverged();
-    repository_.git({"-c", "user.name=x", "-c", "user.email=x@y", "tag", "-a", "-m",
-                     std::string(9000, 'x'), "annotated", "topic"});
-    const NothingChanges nothing(repository_);
-    EXPECT_EQ(
-        failureOfMerge("annotated"),
-        textOf(vclink::test::Failure{GIT_ENOTFOUND, GIT_ERROR_INVALID,
-                                     "the requested type does not match the type in the ODB"}));
-    EXPECT_EQ(branches().getRevision("annotated"), idOf("annotated"));
-}
-
-TEST_F(MergeDispatch, RefusesAFileByItsRightId)
-{
-    makeDiverged();
-    const NothingChanges nothing(repository_);
-    EXPECT_EQ(
-        failureOfMerge("HEAD:file"),
-        textOf(vclink::test::Failure{GIT_ENOTFOUND, GIT_ERROR_INVALID,
-                                     "the requested type does not match the type in the ODB"}));
+    const Failure failure{GIT_ENOTFOUND, GIT_ERROR_INVALID,
+                          "the requested type does not match the type in the ODB"};
+    for (const auto *name : {"annotated", "long", "HEAD:file"})
+        EXPECT_EQ(failureOfMerge(name), textOf(failure)) << name;
+    EXPECT_EQ(branches().getRevision("long"), idOf("long"));
 }
 
 TEST_F(MergeDispatch, TakesTheTagWhereABranchHasTheSameNameAsGitDoes)
@@ -329,18 +233,6 @@ TEST_F(MergeDispatch, OneAfterAnotherWorks)
         EXPECT_TRUE(std::filesystem::exists(repository_ / name)) << name;
     EXPECT_THAT(status(), IsEmpty());
     EXPECT_EQ(repository_.git({"fsck", "--strict", "--no-dangling"}), "");
-}
-
-TEST_F(MergeDispatch, LeavesNoDescriptorOpen)
-{
-    makeDiverged();
-    makeBranch("ahead", [this] { repository_.write("new", "x"); });
-    merge("main");
-    const vclink::test::NoDescriptorLeak noLeak;
-    merge("main");
-    merge("ahead");
-    merge("topic");
-    failureOfMerge("missing");
 }
 
 } // namespace

@@ -1,5 +1,4 @@
 // SPDX-License-Identifier: MIT
-#include <filesystem>
 #include <functional>
 #include <memory>
 #include <stdexcept>
@@ -14,8 +13,8 @@
 #include "error/errorUtil/callbackException.hpp"
 #include "error/logging/severity.hpp"
 #include "main/TestOptionsFactory.hpp"
-#include "support/Descriptors.hpp"
 #include "support/LogCapture.hpp"
+#include "support/NothingLeft.hpp"
 #include "support/cancelAt.hpp"
 #include "support/text.hpp"
 #include "vclink/git/GitException.hpp"
@@ -29,52 +28,22 @@ namespace git = vclink::git;
 using testing::ElementsAre;
 using testing::HasSubstr;
 using testing::IsEmpty;
-using vclink::test::asPath;
-using vclink::test::asUtf8;
-using vclink::test::cancelAt;
-using vclink::test::Failure;
-using vclink::test::LogCapture;
-using vclink::test::NothingChanges;
-using vclink::test::stateOf;
-using vclink::test::textOf;
+using namespace vclink::test;
 using vclink::util::exception::CancelledOperationException;
 
-/// A factory whose options of a merge are what a test says.
-class MergeOptionsFactory : public vclink::test::TestOptionsFactory
-{
-  public:
-    using TestOptionsFactory::TestOptionsFactory;
-    git::MergeOptions makeMergeOptions() override
-    {
-        onMergeOptions();
-        return {};
-    }
-
-    std::function<void()> onMergeOptions;
-};
-
 /// Every cause comes out as one kind of exception, whose added text tells it.
-class MergeFailure : public vclink::test::MergeFixture
+class MergeFailure : public MergeFixture
 {
   protected:
     void divergeInTwoFiles()
     {
-        diverge(
-            [this]
-            {
-                repository_.write("ours", "x");
-                repository_.write("file", "ours\n");
-            },
-            [this]
-            {
-                repository_.write("theirs", "x");
-                repository_.write("other", "theirs\n");
-            });
+        diverge(writes("ours", "x") + writes("file", "ours\n"),
+                writes("theirs", "x") + writes("other", "theirs\n"));
     }
     /// Merges with `action` in the middle of it, before anything was touched.
     void mergeRaising(const std::function<void()> &action) const
     {
-        const auto factory = std::make_shared<MergeOptionsFactory>(interactor_);
+        const auto factory = std::make_shared<TestOptionsFactory>(interactor_);
         factory->onMergeOptions = action;
         git::GitAdapter adapter(asPath(repository_.path()), factory);
         git::BranchManager::create(adapter)->merge("topic");
@@ -93,6 +62,14 @@ class MergeFailure : public vclink::test::MergeFixture
             return text.substr(text.find('\n') + 1);
         }
         return {};
+    }
+    /// Expects that no branch is merged, not even looked up, and that nothing is changed.
+    void expectRefusedForItsState(const std::vector<std::string> &names) const
+    {
+        const NothingChanges nothing(repository_);
+        for (const auto &name : names)
+            EXPECT_EQ(failureOfMerge(name),
+                      textOf(shared_vclink::git::UnableToMergeBadRepositoryState()));
     }
     static std::string cancellation()
     {
@@ -126,67 +103,32 @@ TEST_F(MergeFailure, OfANameThatIsNoAsciiOrEmptyTellsLibGit2sText)
     EXPECT_THAT(failureOfMerge(""), HasSubstr("(code -"));
 }
 
-TEST_F(MergeFailure, OfARepositoryThatCannotBeOpenedIsAFailedMerge)
-{
-    repository_.remove(".git");
-    EXPECT_THAT(failureOfMerge("topic"), HasSubstr("(code -3, category 6)"));
-}
-
-TEST_F(MergeFailure, OfAMergeUnderWayTellsSoAndTouchesNothing)
-{
-    diverge([this] { repository_.write("file", "ours\n"); },
-            [this] { repository_.write("file", "theirs\n"); });
-    expectConflicts("topic");
-    const NothingChanges nothing(repository_);
-    EXPECT_EQ(failureOfMerge("topic"),
-              textOf(shared_vclink::git::UnableToMergeBadRepositoryState()));
-    EXPECT_EQ(failureOfMerge("main"), textOf(shared_vclink::git::UnableToMergeBadRepositoryState()))
-        << "also one that is up to date";
-}
-
-TEST_F(MergeFailure, OfAMergeResolvedAndNotCommittedTellsSo)
+TEST_F(MergeFailure, OfAnOperationUnderWayTellsSoAndTouchesNothing)
 {
     divergeInTwoFiles();
-    repository_.git({"merge", "--quiet", "--no-commit", "topic"});
-    const NothingChanges nothing(repository_);
-    EXPECT_EQ(failureOfMerge("topic"),
-              textOf(shared_vclink::git::UnableToMergeBadRepositoryState()));
-}
-
-TEST_F(MergeFailure, OfAnyOtherOperationUnderWayTellsSo)
-{
-    divergeInTwoFiles();
-    const std::string head = idOf("topic") + '\n';
     const std::vector<std::string> underWay{
-        "REVERT_HEAD",           "CHERRY_PICK_HEAD",     "BISECT_LOG", "rebase-merge/interactive",
-        "rebase-apply/rebasing", "rebase-apply/applying"};
+        "MERGE_HEAD",           "REVERT_HEAD",           "CHERRY_PICK_HEAD",
+        "BISECT_LOG",           "rebase-apply/applying", "rebase-merge/interactive",
+        "rebase-apply/rebasing"};
     for (const auto &name : underWay)
     {
-        repository_.write(".git/" + name, head);
-        {
-            const NothingChanges nothing(repository_);
-            EXPECT_EQ(failureOfMerge("topic"),
-                      textOf(shared_vclink::git::UnableToMergeBadRepositoryState()))
-                << name;
-        }
+        SCOPED_TRACE(name);
+        repository_.write(".git/" + name, idOf("topic") + '\n');
+        expectRefusedForItsState({"topic", "main", "missing"});
         repository_.remove(".git/" + name.substr(0, name.find('/')));
     }
+    // Resolved, and not committed.
+    repository_.git({"merge", "--quiet", "--no-commit", "topic"});
+    expectRefusedForItsState({"topic"});
+    repository_.git({"merge", "--abort"});
     EXPECT_NO_THROW(merge("topic"));
 }
 
-TEST_F(MergeFailure, OfAMergeUnderWayComesBeforeTheNameIsLookedUp)
+TEST_F(MergeFailure, OfConflictsUnderWayTouchesNothing)
 {
-    repository_.write(".git/REVERT_HEAD", idOf("HEAD") + '\n');
-    EXPECT_EQ(failureOfMerge("missing"),
-              textOf(shared_vclink::git::UnableToMergeBadRepositoryState()));
-}
-
-TEST_F(MergeFailure, OfConflictsTellsSo)
-{
-    diverge([this] { repository_.write("file", "ours\n"); },
-            [this] { repository_.write("file", "theirs\n"); });
-    EXPECT_EQ(failureOfMerge("topic"), textOf(shared_vclink::git::HasConflicts()));
-    EXPECT_EQ(idOf("MERGE_HEAD"), idOf("topic"));
+    diverge(writing("file", "ours\n"), writing("file", "theirs\n"));
+    expectConflicts("topic");
+    expectRefusedForItsState({"topic", "main"});
 }
 
 TEST_F(MergeFailure, WithoutAnIdentityLeavesTheMergeToBeCommitted)
@@ -209,64 +151,29 @@ TEST_F(MergeFailure, WithoutAnIdentityLeavesTheMergeToBeCommitted)
     EXPECT_EQ(branches().getRepositoryState(), "Normal");
 }
 
-TEST_F(MergeFailure, OfAMergeWhileTheIndexIsLockedChangesNoFile)
-{
-    divergeInTwoFiles();
-    repository_.write(".git/index.lock", "");
-    auto before = stateOf(repository_);
-    EXPECT_THAT(failureOfMerge("topic"), HasSubstr("(code -14, "));
-    auto after = stateOf(repository_);
-    EXPECT_EQ(after.head, before.head);
-    EXPECT_EQ(after.index, before.index);
-}
-
 TEST_F(MergeFailure, OfACancelledCheckoutTellsWhatTheCancellationSays)
 {
     divergeInTwoFiles();
-    interactor_->cancel();
     const auto before = stateOf(repository_);
-    EXPECT_EQ(failureOfMerge("topic"), cancellation());
-    EXPECT_EQ(git::pendingCallbackException(), nullptr);
-    const auto after = stateOf(repository_);
-    EXPECT_EQ(after.head, before.head);
-    EXPECT_EQ(after.workingTree, before.workingTree);
-    EXPECT_EQ(branches().getRepositoryState(), "Normal");
-}
-
-TEST_F(MergeFailure, OfAMergeCancelledInTheMiddleLeavesTheHead)
-{
-    divergeInTwoFiles();
-    const auto before = stateOf(repository_);
+    for (const bool isAtOnce : {true, false})
     {
         LogCapture log(git::SeverityProgress);
-        cancelAt(log, *interactor_, "Checkout Notify : ");
+        if (isAtOnce)
+            interactor_->cancel();
+        else
+            cancelAt(log, *interactor_, "Checkout Notify : ");
         EXPECT_EQ(failureOfMerge("topic"), cancellation());
+        EXPECT_EQ(git::pendingCallbackException(), nullptr);
+        const auto after = stateOf(repository_);
+        EXPECT_EQ(after.head, before.head);
+        EXPECT_EQ(after.workingTree, before.workingTree);
+        EXPECT_EQ(branches().getRepositoryState(), "Normal");
     }
-    const auto after = stateOf(repository_);
-    EXPECT_EQ(after.head, before.head);
-    EXPECT_EQ(after.workingTree, before.workingTree);
     EXPECT_NO_THROW(merge("topic"));
-    EXPECT_EQ(branches().getRepositoryState(), "Normal");
     EXPECT_THAT(status(), IsEmpty());
 }
 
-TEST_F(MergeFailure, OfACommandThatCannotBeStartedTellsWhatBoostSays)
-{
-    repository_.write(".gitattributes", "file merge=broken\n");
-    repository_.git({"config", "merge.broken.driver", "/nowhere/tool %A"});
-    repository_.commitAll("attributes");
-    diverge([this] { repository_.write("file", "ours\n"); },
-            [this] { repository_.write("file", "theirs\n"); });
-    const std::string head = idOf("HEAD");
-    const vclink::test::NoDescriptorLeak noLeak;
-    EXPECT_THAT(failureOfMerge("topic"), HasSubstr("No such file or directory"));
-    EXPECT_EQ(git::pendingCallbackException(), nullptr);
-    EXPECT_EQ(idOf("HEAD"), head);
-    EXPECT_EQ(repository_.read("file"), "ours\n");
-    EXPECT_THAT(std::filesystem::is_empty(environment().temporary()), true);
-}
-
-TEST_F(MergeFailure, OfAStandardExceptionTellsItsWhat)
+TEST_F(MergeFailure, OfAStandardExceptionTellsItsWhatOrItsMessage)
 {
     divergeInTwoFiles();
     const NothingChanges nothing(repository_);
@@ -274,12 +181,6 @@ TEST_F(MergeFailure, OfAStandardExceptionTellsItsWhat)
               "gr\xC3\xBC\xC3\x9F");
     EXPECT_EQ(addedTextOf([] { throw std::bad_alloc(); }), "std::bad_alloc");
     EXPECT_EQ(addedTextOf([] { throw CancelledOperationException(); }), cancellation());
-}
-
-TEST_F(MergeFailure, OfAnExceptionWithAMessageTellsIt)
-{
-    divergeInTwoFiles();
-    const NothingChanges nothing(repository_);
     EXPECT_EQ(
         addedTextOf([] { throw git::GitException(shared_vclink::git::NoUserName(), u"more"); }),
         textOf(shared_vclink::git::NoUserName()) + "\nmore");
@@ -289,6 +190,7 @@ TEST_F(MergeFailure, OfAnythingElseComesOutUnchanged)
 {
     divergeInTwoFiles();
     const NothingChanges nothing(repository_);
+    const NothingLeft check(environment().temporary());
     try
     {
         mergeRaising([] { throw 42; });
@@ -298,17 +200,6 @@ TEST_F(MergeFailure, OfAnythingElseComesOutUnchanged)
     {
         EXPECT_EQ(number, 42);
     }
-}
-
-TEST_F(MergeFailure, ReleasesAllThatItOpened)
-{
-    divergeInTwoFiles();
-    EXPECT_ANY_THROW(mergeRaising([] { throw 42; }));
-    const vclink::test::NoDescriptorLeak noLeak;
-    EXPECT_ANY_THROW(mergeRaising([] { throw 42; }));
-    EXPECT_ANY_THROW(mergeRaising([] { throw std::logic_error("x"); }));
-    interactor_->cancel();
-    failureOfMerge("topic");
 }
 
 } // namespace

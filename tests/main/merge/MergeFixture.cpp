@@ -144,6 +144,11 @@ void MergeFixture::diverge(const std::function<void()> &ours, const std::functio
     repository_.commitAll("on main");
 }
 
+void MergeFixture::diverge(const Change &ours, const Change &theirs)
+{
+    diverge([&] { ours(repository_); }, [&] { theirs(repository_); });
+}
+
 void MergeFixture::makeAhead()
 {
     makeBranch("topic", [this] { repository_.write("new", "x"); });

@@ -7,6 +7,7 @@
 #include <vector>
 
 #include "main/branches/BranchFixture.hpp"
+#include "support/Change.hpp"
 
 namespace vclink::test
 {
@@ -54,6 +55,7 @@ class MergeFixture : public BranchFixture
     std::function<void()> moving(const std::string &from, const std::string &to) const;
     /// Has `ours` committed on main and `theirs` on the new branch "topic".
     void diverge(const std::function<void()> &ours, const std::function<void()> &theirs);
+    void diverge(const Change &ours, const Change &theirs);
     /// Makes the branch "topic" with a commit that main does not have, of the file "new".
     void makeAhead();
     /// diverge() with a new file on either side, "ours" and "theirs".

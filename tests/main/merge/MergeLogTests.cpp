@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: MIT
 #include <string>
+#include <utility>
 #include <vector>
 
 #include <git2.h>
@@ -10,6 +11,7 @@
 #include "error/logging/severity.hpp"
 #include "main/merge/BranchMerger.hpp"
 #include "support/LogCapture.hpp"
+#include "support/Sentence.hpp"
 
 namespace
 {
@@ -18,139 +20,112 @@ namespace git = vclink::git;
 using git::mergeAnalysisToText;
 using git::mergePreferenceToText;
 using testing::ElementsAre;
-using vclink::test::LogCapture;
-using vclink::test::LogRecord;
+using namespace vclink::test;
 
 const std::string mergeSignature = "virtual void vclink::git::BasicBranchManager::merge("
                                    "vclink::git::BranchManager::BranchName)";
 constexpr unsigned tracing =
     git::SeverityScopeEntry | git::SeverityScopeExit | git::SeverityParameter;
 
-TEST(MergeAnalysisText, NamesEachBitWithABlankBehindIt)
+TEST(MergeAnalysisText, HasTheWordsOfTheBitsInOneOrderWithABlankBehindEach)
 {
-    EXPECT_EQ(mergeAnalysisToText(GIT_MERGE_ANALYSIS_NORMAL), "GIT_MERGE_ANALYSIS_NORMAL ");
-    EXPECT_EQ(mergeAnalysisToText(GIT_MERGE_ANALYSIS_UP_TO_DATE), "GIT_MERGE_ANALYSIS_UP_TO_DATE ");
-    EXPECT_EQ(mergeAnalysisToText(GIT_MERGE_ANALYSIS_FASTFORWARD),
-              "GIT_MERGE_ANALYSIS_FASTFORWARD ");
-    EXPECT_EQ(mergeAnalysisToText(GIT_MERGE_ANALYSIS_UNBORN), "GIT_MERGE_ANALYSIS_UNBORN ");
+    const std::string normal = "GIT_MERGE_ANALYSIS_NORMAL ";
+    const std::string nothingToMerge = "GIT_MERGE_ANALYSIS_UP_TO_DATE ";
+    const std::string fastForward = "GIT_MERGE_ANALYSIS_FASTFORWARD ";
+    const std::string unborn = "GIT_MERGE_ANALYSIS_UNBORN ";
+    const std::vector<std::pair<unsigned, std::string>> texts{
+        {GIT_MERGE_ANALYSIS_NORMAL, normal},
+        {GIT_MERGE_ANALYSIS_UP_TO_DATE, nothingToMerge},
+        {GIT_MERGE_ANALYSIS_FASTFORWARD, fastForward},
+        {GIT_MERGE_ANALYSIS_UNBORN, unborn},
+        {1, normal},
+        {2, nothingToMerge},
+        {4, fastForward},
+        {8, unborn},
+        {5, fastForward + normal},
+        {12, unborn + fastForward},
+        {15, nothingToMerge + unborn + fastForward + normal},
+        {0, ""},
+        {0x12, nothingToMerge},
+        {0xFFFFFFF0U, ""}};
+    for (const auto &[bits, text] : texts)
+        EXPECT_EQ(mergeAnalysisToText(bits), text) << bits;
 }
 
-TEST(MergeAnalysisText, GoesByTheseNumbers)
+TEST(MergePreferenceText, HasTheWordsOfTheBitsWithABlankBehindEach)
 {
-    EXPECT_EQ(mergeAnalysisToText(1), "GIT_MERGE_ANALYSIS_NORMAL ");
-    EXPECT_EQ(mergeAnalysisToText(2), "GIT_MERGE_ANALYSIS_UP_TO_DATE ");
-    EXPECT_EQ(mergeAnalysisToText(4), "GIT_MERGE_ANALYSIS_FASTFORWARD ");
-    EXPECT_EQ(mergeAnalysisToText(8), "GIT_MERGE_ANALYSIS_UNBORN ");
+    const std::string no = "GIT_MERGE_PREFERENCE_NO_FASTFORWARD ";
+    const std::string only = "GIT_MERGE_PREFERENCE_FASTFORWARD_ONLY ";
+    const std::vector<std::pair<unsigned, std::string>> texts{
+        {1, no}, {2, only}, {3, no + only}, {GIT_MERGE_PREFERENCE_NONE, ""}, {0xFFFFFFFCU, ""}};
+    for (const auto &[bits, text] : texts)
+        EXPECT_EQ(mergePreferenceToText(bits), text) << bits;
 }
 
-TEST(MergeAnalysisText, HasItsWordsInOneOrder)
+class MergeLog : public MergeFixture
 {
-    EXPECT_EQ(mergeAnalysisToText(15), "GIT_MERGE_ANALYSIS_UP_TO_DATE GIT_MERGE_ANALYSIS_UNBORN "
-                                       "GIT_MERGE_ANALYSIS_FASTFORWARD GIT_MERGE_ANALYSIS_NORMAL ");
-    EXPECT_EQ(mergeAnalysisToText(5), "GIT_MERGE_ANALYSIS_FASTFORWARD GIT_MERGE_ANALYSIS_NORMAL ");
-    EXPECT_EQ(mergeAnalysisToText(12), "GIT_MERGE_ANALYSIS_UNBORN GIT_MERGE_ANALYSIS_FASTFORWARD ");
-}
-
-TEST(MergeAnalysisText, IsEmptyForNoBitsAndUnknownOnes)
-{
-    EXPECT_EQ(mergeAnalysisToText(0), "");
-    EXPECT_EQ(mergeAnalysisToText(0xFFFFFFF0U), "");
-    EXPECT_EQ(mergeAnalysisToText(0x12), "GIT_MERGE_ANALYSIS_UP_TO_DATE ");
-}
-
-TEST(MergePreferenceText, NamesEachBitWithABlankBehindIt)
-{
-    EXPECT_EQ(mergePreferenceToText(1), "GIT_MERGE_PREFERENCE_NO_FASTFORWARD ");
-    EXPECT_EQ(mergePreferenceToText(2), "GIT_MERGE_PREFERENCE_FASTFORWARD_ONLY ");
-    EXPECT_EQ(mergePreferenceToText(3),
-              "GIT_MERGE_PREFERENCE_NO_FASTFORWARD GIT_MERGE_PREFERENCE_FASTFORWARD_ONLY ");
-}
-
-TEST(MergePreferenceText, IsEmptyForNoBitsAndUnknownOnes)
-{
-    EXPECT_EQ(mergePreferenceToText(GIT_MERGE_PREFERENCE_NONE), "");
-    EXPECT_EQ(mergePreferenceToText(0xFFFFFFFCU), "");
-}
-
-class MergeLog : public vclink::test::MergeFixture
-{
-  protected:
-    /// The diagnostic records of a merge that may fail, without those of drivers and failures.
-    std::vector<std::string> decisions(const std::string &name) const
-    {
-        const LogCapture log(git::SeverityDiagnostic);
-        try
-        {
-            merge(name);
-        }
-        catch (const std::exception &)
-        {
-            failed_ = true;
-        }
-        return log.messages();
-    }
-
-    mutable bool failed_ = false;
 };
 
-TEST_F(MergeLog, TellsOfUpToDateAndNothingElse)
+/// What is merged, what the two records about it say and whether the merge fails then.
+struct Decision : Sentence
 {
-    EXPECT_THAT(decisions("main"), ElementsAre("Merge Analysis: GIT_MERGE_ANALYSIS_UP_TO_DATE ",
-                                               "Merge Preference: "));
-    EXPECT_FALSE(failed_);
-}
+    Change prepare;
+    std::string analysis;
+    std::string preference = "";
+    bool isFailure = false;
+    std::string name = "topic";
+};
 
-TEST_F(MergeLog, TellsOfAFastForward)
+class MergeDecision : public MergeLog, public testing::WithParamInterface<Decision>
+{
+};
+
+TEST_P(MergeDecision, IsToldAmongTheDiagnosticsAndNothingElse)
 {
     makeAhead();
-    EXPECT_THAT(decisions("topic"), ElementsAre("Merge Analysis: GIT_MERGE_ANALYSIS_FASTFORWARD "
-                                                "GIT_MERGE_ANALYSIS_NORMAL ",
-                                                "Merge Preference: "));
-    EXPECT_FALSE(failed_);
+    repository_.git({"branch", "ahead", "topic"});
+    if (GetParam().prepare)
+        GetParam().prepare(repository_);
+    const LogCapture log(git::SeverityDiagnostic);
+    if (GetParam().isFailure)
+        failureOfMerge(GetParam().name);
+    else
+        merge(GetParam().name);
+    EXPECT_THAT(log.messages(), ElementsAre("Merge Analysis: " + GetParam().analysis,
+                                            "Merge Preference: " + GetParam().preference));
 }
 
-TEST_F(MergeLog, TellsOfATrueMerge)
-{
-    makeDiverged();
-    EXPECT_THAT(decisions("topic"),
-                ElementsAre("Merge Analysis: GIT_MERGE_ANALYSIS_NORMAL ", "Merge Preference: "));
-    EXPECT_FALSE(failed_);
-}
+const Change divergence =
+    runsGit({"-c", "user.name=x", "-c", "user.email=x", "commit", "-qm.", "--allow-empty"});
+const Decision decisions[]{
+    {{"OfABranchThatIsUpToDate"}, {}, "GIT_MERGE_ANALYSIS_UP_TO_DATE ", "", false, "main"},
+    {{"OfAFastForward"}, {}, "GIT_MERGE_ANALYSIS_FASTFORWARD GIT_MERGE_ANALYSIS_NORMAL "},
+    {{"OfATrueMerge"}, divergence, "GIT_MERGE_ANALYSIS_NORMAL "},
+    {{"AgainstFastForwards"},
+     runsGit({"config", "merge.ff", "false"}),
+     "GIT_MERGE_ANALYSIS_FASTFORWARD GIT_MERGE_ANALYSIS_NORMAL ",
+     "GIT_MERGE_PREFERENCE_NO_FASTFORWARD "},
+    {{"ForFastForwardsOnly"},
+     divergence + runsGit({"config", "merge.ff", "only"}),
+     "GIT_MERGE_ANALYSIS_NORMAL ",
+     "GIT_MERGE_PREFERENCE_FASTFORWARD_ONLY ",
+     true},
+    {{"OnAnUnbornBranch"},
+     runsGit({"checkout", "--quiet", "--orphan", "unborn"}),
+     "GIT_MERGE_ANALYSIS_UNBORN GIT_MERGE_ANALYSIS_FASTFORWARD ",
+     "",
+     true,
+     "main"},
+};
 
-TEST_F(MergeLog, TellsThatFastForwardsAreNotWanted)
-{
-    makeAhead();
-    prefer("false");
-    EXPECT_THAT(decisions("topic"),
-                ElementsAre("Merge Analysis: GIT_MERGE_ANALYSIS_FASTFORWARD "
-                            "GIT_MERGE_ANALYSIS_NORMAL ",
-                            "Merge Preference: GIT_MERGE_PREFERENCE_NO_FASTFORWARD "));
-}
-
-TEST_F(MergeLog, TellsThatOnlyFastForwardsAreAllowed)
-{
-    makeDiverged();
-    prefer("only");
-    EXPECT_THAT(decisions("topic"),
-                ElementsAre("Merge Analysis: GIT_MERGE_ANALYSIS_NORMAL ",
-                            "Merge Preference: GIT_MERGE_PREFERENCE_FASTFORWARD_ONLY "));
-    EXPECT_TRUE(failed_);
-}
-
-TEST_F(MergeLog, TellsOfAnUnbornBranch)
-{
-    repository_.git({"checkout", "--quiet", "--orphan", "unborn"});
-    EXPECT_THAT(decisions("main"), ElementsAre("Merge Analysis: GIT_MERGE_ANALYSIS_UNBORN "
-                                               "GIT_MERGE_ANALYSIS_FASTFORWARD ",
-                                               "Merge Preference: "));
-    EXPECT_TRUE(failed_);
-}
+INSTANTIATE_TEST_SUITE_P(The, MergeDecision, testing::ValuesIn(decisions),
+                         testing::PrintToStringParamName());
 
 TEST_F(MergeLog, TellsNothingOfTheAnalysisBeforeIt)
 {
-    EXPECT_THAT(decisions("missing"),
-                ElementsAre("Throwing error revspec 'missing' not found (-3)"));
-    EXPECT_TRUE(failed_);
+    const LogCapture log(git::SeverityDiagnostic);
+    failureOfMerge("missing");
+    EXPECT_THAT(log.messages(), ElementsAre("Throwing error revspec 'missing' not found (-3)"));
 }
 
 TEST_F(MergeLog, TellsOfTheExceptionThatItTurnsIntoAFailedMerge)
@@ -162,19 +137,6 @@ TEST_F(MergeLog, TellsOfTheExceptionThatItTurnsIntoAFailedMerge)
     ASSERT_EQ(log.messages().size(), 1U);
     EXPECT_THAT(log.messages().front(), testing::StartsWith("Exception caught: "));
     EXPECT_THAT(log.messages().front(), testing::HasSubstr("MergePreferenceFastForward"));
-}
-
-TEST_F(MergeLog, HasTheAnalysisAmongTheDiagnostics)
-{
-    const LogCapture log;
-    merge("main");
-    std::vector<unsigned> severities;
-    for (const LogRecord &record : log.records())
-    {
-        if (record.message.rfind("Merge ", 0) == 0)
-            severities.push_back(record.severity);
-    }
-    EXPECT_THAT(severities, ElementsAre(git::SeverityDiagnostic, git::SeverityDiagnostic));
 }
 
 TEST_F(MergeLog, TracesTheMergeWithItsParameter)
@@ -191,7 +153,7 @@ TEST_F(MergeLog, TracesAMergeThatFails)
 {
     repository_.remove(".git");
     const LogCapture log(tracing);
-    EXPECT_ANY_THROW(merge("topic"));
+    EXPECT_THAT(failureOfMerge("topic"), testing::HasSubstr("(code -3, category 6)"));
     const auto messages = log.messages();
     ASSERT_GE(messages.size(), 3U);
     EXPECT_EQ(messages[0], mergeSignature);

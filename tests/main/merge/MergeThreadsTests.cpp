@@ -28,10 +28,7 @@ namespace
 using vclink::git::BranchManager;
 using vclink::git::GitAdapterFactory;
 using vclink::git::LibGit2Guard;
-using vclink::test::asPath;
-using vclink::test::GitRepository;
-using vclink::test::LibGit2Session;
-using vclink::test::TestInteractor;
+using namespace vclink::test;
 
 constexpr int mergeRounds = 10;
 
@@ -62,7 +59,7 @@ class Meeting
     pthread_barrier_t barrier_{};
 };
 
-class MergeThreads : public vclink::test::GitFixture
+class MergeThreads : public GitFixture
 {
   protected:
     MergeThreads()
@@ -139,7 +136,7 @@ class MergeThreads : public vclink::test::GitFixture
         repository.git({"reset", "--quiet", "--hard", "HEAD^"});
     }
 
-    vclink::test::Scripts scripts_{folder() / "scripts"};
+    Scripts scripts_{folder() / "scripts"};
     std::array<GitRepository, 2> repositories_{makeRepository("one"), makeRepository("two")};
     std::array<std::shared_ptr<TestInteractor>, 2> interactors_{std::make_shared<TestInteractor>(),
                                                                 std::make_shared<TestInteractor>()};

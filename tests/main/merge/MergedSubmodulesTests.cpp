@@ -2,6 +2,8 @@
 #include <functional>
 #include <memory>
 #include <string>
+#include <utility>
+#include <vector>
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
@@ -14,17 +16,16 @@ namespace
 
 using testing::ElementsAre;
 using testing::IsEmpty;
-using vclink::test::asPath;
-using vclink::test::GitRepository;
+using namespace vclink::test;
 
 /// Merges of branches that have the submodule "module", whose repository has three commits.
-class MergedSubmodules : public vclink::test::MergeFixture
+class MergedSubmodules : public MergeFixture
 {
   protected:
     MergedSubmodules()
     {
         auto inner = addModule();
-        first_ = idOf("HEAD:module");
+        first_ = merged();
         inner.write("inner", "2\n");
         second_ = inner.commitAll("inner 2");
         inner.write("inner", "3\n");
@@ -57,18 +58,10 @@ class MergedSubmodules : public vclink::test::MergeFixture
             },
             moving(second_));
     }
-    /// The same, and "file" is in conflict.
-    void theyMoveInConflict()
+    /// The submodule's commit at HEAD; empty when it has none.
+    std::string merged() const
     {
-        makeBranch("topic",
-                   [this]
-                   {
-                       go(second_);
-                       repository_.write("file", "theirs\n");
-                   });
-        go(first_);
-        repository_.write("file", "ours\n");
-        repository_.commitAll("on main");
+        return repository_.line({"ls-tree", "--format=%(objectname)", "HEAD", "module"});
     }
     /// "topic" takes the submodule out of the index and leaves its folder.
     void theyRemove(const std::function<void()> &ours, const std::string &file = "theirs")
@@ -90,17 +83,14 @@ class MergedSubmodules : public vclink::test::MergeFixture
         repository_.add({"ours"});
         repository_.commit("on before");
     }
-    /// Merges "topic", which has moved the submodule, into main, which has removed it and left its
-    /// folder.
-    void weRemoveAndTheyMove()
+    /// Has the submodule removed on main and its folder left.
+    void weRemove()
     {
-        makeBranch("topic", moving(second_));
         removing()();
         repository_.commit("on main");
         repository_.write(".git/info/exclude", "/module\n");
-        expectConflicts("topic");
     }
-    static vclink::test::CommandResult commitByGit(const GitRepository &repository)
+    static CommandResult commitByGit(const GitRepository &repository)
     {
         return repository.tryGit({"commit", "--quiet", "--all", "--message", "merged"});
     }
@@ -133,71 +123,57 @@ class MergedSubmodules : public vclink::test::MergeFixture
     std::string third_;
 };
 
-TEST_F(MergedSubmodules, TakeTheCommitOfTheSideThatMovedThem)
+TEST_F(MergedSubmodules, TakeTheCommitOfTheSideThatMovedThemAndNotWhatIsCheckedOut)
 {
     theyMove(writing("ours", "x"));
     ASSERT_EQ(idOf("main:module"), first_);
     ASSERT_EQ(idOf("topic:module"), second_);
-    expectAsGitBesideTheFolder();
-    EXPECT_EQ(idOf("HEAD:module"), second_);
-    EXPECT_EQ(module_.line({"rev-parse", "HEAD"}), first_) << "what is checked out stays";
+    const std::string ours = idOf("main");
+    for (const std::string &id : {first_, third_})
+    {
+        go(id);
+        expectAsGitBesideTheFolder();
+        EXPECT_EQ(merged(), second_);
+        EXPECT_EQ(module_.line({"rev-parse", "HEAD"}), id) << "what is checked out stays";
+        EXPECT_THAT(status(), ElementsAre(" M module"));
+        // The user's choice is the next commit's.
+        commit();
+        EXPECT_EQ(merged(), id);
+        repository_.git({"reset", "--quiet", "--hard", ours});
+    }
 }
 
 TEST_F(MergedSubmodules, KeepTheCommitThatOursMovedThemTo)
 {
     diverge(moving(third_), writing("theirs", "x"));
+    go(second_);
     expectAsGitBesideTheFolder();
-    EXPECT_EQ(idOf("HEAD:module"), third_);
+    EXPECT_EQ(merged(), third_) << "not what is checked out";
 }
 
-TEST_F(MergedSubmodules, DoNotTakeWhatIsCheckedOutIntoTheMerge)
+TEST_F(MergedSubmodules, InACommitByHandStayAsMergedUnlessTheUserHasMovedOrRemovedThem)
 {
-    theyMove(writing("ours", "x"));
-    go(third_);
-    expectAsGitBesideTheFolder();
-    EXPECT_EQ(idOf("HEAD:module"), second_);
-    EXPECT_THAT(status(), ElementsAre(" M module"));
-    // The user's choice is the next commit's.
-    commit();
-    EXPECT_EQ(idOf("HEAD:module"), third_);
-}
-
-TEST_F(MergedSubmodules, ThatNobodyMovedAreNotTakenFromWhatIsCheckedOut)
-{
-    diverge(writing("ours", "x"), writing("theirs", "x"));
-    go(third_);
-    expectAsGitBesideTheFolder();
-    EXPECT_EQ(idOf("HEAD:module"), first_);
-}
-
-TEST_F(MergedSubmodules, StayAsMergedInACommitByHand)
-{
-    theyMoveInConflict();
-    expectConflicts("topic");
-    repository_.write("file", "both\n");
-    commit();
-    EXPECT_EQ(idOf("HEAD:module"), second_);
-    EXPECT_THAT(parents(), testing::SizeIs(2));
-}
-
-TEST_F(MergedSubmodules, AreTheUsersInACommitByHandAfterACheckout)
-{
-    theyMoveInConflict();
-    expectConflicts("topic");
-    repository_.write("file", "both\n");
-    go(third_);
-    commit();
-    EXPECT_EQ(idOf("HEAD:module"), third_);
-}
-
-TEST_F(MergedSubmodules, AreGoneInACommitByHandWithTheirFolder)
-{
-    theyMoveInConflict();
-    expectConflicts("topic");
-    repository_.write("file", "both\n");
-    repository_.remove("module");
-    commit();
-    EXPECT_EQ(repository_.line({"ls-tree", "--name-only", "HEAD", "module"}), "");
+    makeBranch("topic",
+               [this]
+               {
+                   go(second_);
+                   repository_.write("file", "theirs\n");
+               });
+    go(first_);
+    repository_.write("file", "ours\n");
+    repository_.commitAll("on main");
+    const std::vector<std::pair<std::function<void()>, std::string>> changes{
+        {[] {}, second_}, {moving(third_), third_}, {[this] { repository_.remove("module"); }, ""}};
+    for (const auto &[change, id] : changes)
+    {
+        expectConflicts("topic");
+        repository_.write("file", "both\n");
+        change();
+        commit();
+        EXPECT_EQ(merged(), id);
+        EXPECT_THAT(parents(), testing::SizeIs(2));
+        repository_.git({"reset", "--quiet", "--hard", "main@{1}"});
+    }
 }
 
 TEST_F(MergedSubmodules, OfAMergeByGitStayAsMergedInACommit)
@@ -205,7 +181,7 @@ TEST_F(MergedSubmodules, OfAMergeByGitStayAsMergedInACommit)
     theyMove(writing("ours", "x"));
     repository_.git({"merge", "--quiet", "--no-commit", "topic"});
     commit();
-    EXPECT_EQ(idOf("HEAD:module"), second_);
+    EXPECT_EQ(merged(), second_);
 }
 
 TEST_F(MergedSubmodules, InConflictAreTakenAsTheyAreCheckedOut)
@@ -216,22 +192,17 @@ TEST_F(MergedSubmodules, InConflictAreTakenAsTheyAreCheckedOut)
                 go(second_);
                 GitRepository(module_).commitAll("theirs");
             });
-    go(third_);
-    expectConflicts("topic");
-    EXPECT_THAT(conflicts(), ElementsAre("1 module", "2 module", "3 module"));
-    commit();
-    EXPECT_EQ(idOf("HEAD:module"), third_);
-    EXPECT_THAT(status(), IsEmpty());
-}
-
-TEST_F(MergedSubmodules, InConflictAreTakenAsTheUserHasCheckedThemOut)
-{
-    diverge(moving(third_), moving(second_));
-    go(third_);
-    expectConflicts("topic");
-    go(first_);
-    commit();
-    EXPECT_EQ(idOf("HEAD:module"), first_);
+    for (const std::string &id : {third_, first_})
+    {
+        go(third_);
+        expectAsGitBesideTheFolder();
+        EXPECT_THAT(conflicts(), ElementsAre("1 module", "2 module", "3 module"));
+        go(id);
+        commit();
+        EXPECT_EQ(merged(), id);
+        EXPECT_THAT(status(), IsEmpty());
+        repository_.git({"reset", "--quiet", "--hard", "main@{1}"});
+    }
 }
 
 TEST_F(MergedSubmodules, InConflictThatAreNotPopulatedStayOurs)
@@ -240,7 +211,7 @@ TEST_F(MergedSubmodules, InConflictThatAreNotPopulatedStayOurs)
     repository_.git({"submodule", "--quiet", "deinit", "--force", "module"});
     expectConflicts("topic");
     commit();
-    EXPECT_EQ(idOf("HEAD:module"), third_);
+    EXPECT_EQ(merged(), third_);
 }
 
 TEST_F(MergedSubmodules, ThatTheyRemovedLeaveTheIndexAndStayOnDisk)
@@ -248,7 +219,7 @@ TEST_F(MergedSubmodules, ThatTheyRemovedLeaveTheIndexAndStayOnDisk)
     module_.write("untracked", "mine\n");
     theyRemove(writing("ours", "x"));
     expectAsGitBesideTheFolder();
-    EXPECT_EQ(repository_.line({"ls-tree", "--name-only", "HEAD", "module"}), "");
+    EXPECT_EQ(merged(), "");
     EXPECT_EQ(module_.read("untracked"), "mine\n");
     EXPECT_EQ(module_.line({"rev-parse", "HEAD"}), first_);
 }
@@ -261,7 +232,7 @@ TEST_F(MergedSubmodules, ThatTheyRemovedAreGoneBesideConflictsToo)
     EXPECT_EQ(repository_.line({"ls-files", "module"}), "");
     repository_.write("file", "both\n");
     commit();
-    EXPECT_EQ(repository_.line({"ls-tree", "--name-only", "HEAD", "module"}), "");
+    EXPECT_EQ(merged(), "");
 }
 
 TEST_F(MergedSubmodules, ThatTheyRemovedAndWeMovedAreInConflict)
@@ -271,47 +242,37 @@ TEST_F(MergedSubmodules, ThatTheyRemovedAndWeMovedAreInConflict)
     EXPECT_THAT(conflicts(), ElementsAre("1 module", "2 module"));
 }
 
-TEST_F(MergedSubmodules, ThatWeRemovedAndTheyMovedAreInConflictBesideAnIgnoredFolder)
+/// As in a clone of git, where `git rm` has left the folder of a submodule with edits.
+TEST_F(MergedSubmodules, ThatWeRemovedAndTheyMovedAreTakenAsTheyAreCheckedOutOrStayRemoved)
 {
     makeBranch("topic", moving(second_));
-    removing()();
-    repository_.commit("on main");
-    repository_.write(".git/info/exclude", "/module\n");
+    weRemove();
     expectAsGitBesideTheFolder();
     EXPECT_THAT(conflicts(), ElementsAre("1 module", "3 module"));
-}
-
-/// As in a clone of git, where `git rm` has left the folder of a submodule with edits.
-TEST_F(MergedSubmodules, ThatWeRemovedAndTheyMovedAreTakenAsTheyAreCheckedOut)
-{
-    weRemoveAndTheyMove();
     for (const std::string &id : {first_, second_, third_})
     {
         go(id);
         expectCommitAsGit();
-        EXPECT_EQ(idOf("HEAD:module"), id);
+        EXPECT_EQ(merged(), id);
         repository_.git({"reset", "--quiet", "--hard", "main@{1}"});
         expectConflicts("topic");
     }
-}
-
-TEST_F(MergedSubmodules, ThatWeRemovedAndTheyMovedStayRemovedWithTheirFolder)
-{
-    weRemoveAndTheyMove();
     repository_.remove("module");
     expectCommitAsGit();
-    EXPECT_EQ(repository_.line({"ls-tree", "--name-only", "HEAD", "module"}), "");
+    EXPECT_EQ(merged(), "");
 }
 
 /// git commits nothing then: it has no commit to take.
 TEST_F(MergedSubmodules, ThatWeRemovedAndTheyMovedStayRemovedWithoutARepository)
 {
-    weRemoveAndTheyMove();
+    makeBranch("topic", moving(second_));
+    weRemove();
+    expectConflicts("topic");
     repository_.remove("module");
     repository_.write("module/mine", "mine\n");
     EXPECT_FALSE(commitByGit(makeTwin()).succeeded());
     commit();
-    EXPECT_EQ(repository_.line({"ls-tree", "--name-only", "HEAD", "module"}), "");
+    EXPECT_EQ(merged(), "");
     EXPECT_EQ(repository_.read("module/mine"), "mine\n");
 }
 
@@ -336,7 +297,7 @@ TEST_F(MergedSubmodules, ComeToTheFolderThatABranchHasLeft)
     module_.write("untracked", "mine\n");
     ASSERT_THAT(status(), ElementsAre("?? module/"));
     expectAsGitBesideTheFolder();
-    EXPECT_EQ(idOf("HEAD:module"), second_);
+    EXPECT_EQ(merged(), second_);
     EXPECT_EQ(module_.read("untracked"), "mine\n");
 }
 
@@ -349,7 +310,7 @@ TEST_F(MergedSubmodules, ComeToARepositoryWithoutACommit)
     const auto empty = GitRepository::init(repository_ / "module");
     empty.write("untracked", "mine\n");
     expectAsGitBesideTheFolder();
-    EXPECT_EQ(idOf("HEAD:module"), first_);
+    EXPECT_EQ(merged(), first_);
     EXPECT_EQ(empty.read("untracked"), "mine\n");
 }
 
@@ -395,7 +356,7 @@ TEST_F(MergedSubmodules, ThatNoParentHasAreNotInAMerge)
     vclink::git::BranchManager::create(adapter)->merge("topic");
     EXPECT_EQ(repository_.git({"ls-tree", "--name-only", "HEAD", "nowhere"}), "");
     EXPECT_EQ(repository_.git({"show", "HEAD:other"}), repository_.read("other"));
-    EXPECT_EQ(idOf("HEAD:module"), second_);
+    EXPECT_EQ(merged(), second_);
 }
 
 } // namespace

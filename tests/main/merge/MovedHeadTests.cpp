@@ -25,15 +25,9 @@ namespace git = vclink::git;
 using testing::ElementsAre;
 using testing::HasSubstr;
 using testing::IsEmpty;
-using vclink::test::Failure;
-using vclink::test::failureOf;
-using vclink::test::LateCommit;
-using vclink::test::LibGit2Recorder;
-using vclink::test::splitLines;
-using vclink::test::stateOf;
-using vclink::test::textOf;
+using namespace vclink::test;
 
-class MovedHead : public vclink::test::BranchCallsFixture
+class MovedHead : public BranchCallsFixture
 {
   protected:
     /// "topic" is ahead, with changes of each kind, or diverged.
@@ -340,7 +334,7 @@ TEST_F(MovedHead, IsNoneIfTheAdaptersOwnCommitMovesIt)
 {
     makeTopic(true);
     TwiceCommittingAdapter adapter(
-        vclink::test::asPath(repository_.path()),
+        asPath(repository_.path()),
         std::static_pointer_cast<vclink::ApplicationInteractor>(interactor_));
     git::BranchManager::create(adapter)->merge("topic");
     EXPECT_EQ(splitLines(repository_.git({"log", "--first-parent", "-3", "--format=%s"})),

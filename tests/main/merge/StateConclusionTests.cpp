@@ -7,6 +7,7 @@
 #include <gtest/gtest.h>
 
 #include "main/files/CommitFixture.hpp"
+#include "support/Sentence.hpp"
 
 namespace
 {
@@ -15,10 +16,10 @@ using testing::Contains;
 using testing::ElementsAre;
 using testing::IsEmpty;
 using testing::Key;
-using vclink::test::stateOf;
+using namespace vclink::test;
 
 /// A commit while something other than a merge is under way: it has one parent, and ends it.
-class StateConclusion : public vclink::test::CommitFixture
+class StateConclusion : public CommitFixture
 {
   protected:
     /// Two branches of one commit each, "main" and "theirs", which conflict in "file".
@@ -73,42 +74,51 @@ class StateConclusion : public vclink::test::CommitFixture
     }
 };
 
-TEST_F(StateConclusion, EndsARevert)
+/// A command of git that stops at a conflict, and what it leaves in git's folder.
+struct StoppedCommand : Sentence
 {
+    std::vector<std::string> arguments;
+    std::vector<std::string> names;
+};
+
+class StoppedState : public StateConclusion, public testing::WithParamInterface<StoppedCommand>
+{
+};
+
+TEST_P(StoppedState, IsEndedByACommit)
+{
+    repository_.git({"checkout", "--quiet", "theirs"});
+    repository_.commit("theirs, too");
+    repository_.git({"checkout", "--quiet", "main"});
     repository_.write("file", "once more\n");
     repository_.commitAll("second");
-    stopAt({"revert", "--no-edit", "HEAD^"});
-    expectEnds({"REVERT_HEAD", "MERGE_MSG"});
+    stopAt(GetParam().arguments);
+    expectEnds(GetParam().names);
 }
+
+const StoppedCommand stoppedCommands[]{
+    {{"Revert"}, {"revert", "--no-edit", "HEAD^"}, {"REVERT_HEAD", "MERGE_MSG"}},
+    {{"SequenceOfReverts"},
+     {"revert", "--no-edit", "HEAD^", "HEAD"},
+     {"REVERT_HEAD", "MERGE_MSG", "sequencer"}},
+    {{"CherryPick"}, {"cherry-pick", "theirs^"}, {"CHERRY_PICK_HEAD", "MERGE_MSG"}},
+    {{"SequenceOfCherryPicks"},
+     {"cherry-pick", "theirs^", "theirs"},
+     {"CHERRY_PICK_HEAD", "MERGE_MSG", "sequencer"}},
+    {{"InteractiveRebase"},
+     {"-c", "sequence.editor=true", "rebase", "--interactive", "theirs"},
+     {"rebase-merge", "rebase-merge/interactive", "MERGE_MSG"}},
+    {{"RebaseThatAppliesPatches"}, {"rebase", "--apply", "theirs"}, {"rebase-apply"}},
+};
+
+INSTANTIATE_TEST_SUITE_P(Of, StoppedState, testing::ValuesIn(stoppedCommands),
+                         testing::PrintToStringParamName());
 
 TEST_F(StateConclusion, EndsARevertWithoutConflicts)
 {
     repository_.git({"revert", "--no-commit", "HEAD"});
     expectEnds({"REVERT_HEAD", "MERGE_MSG"});
     EXPECT_EQ(idOf("HEAD^{tree}"), idOf("HEAD~2^{tree}"));
-}
-
-TEST_F(StateConclusion, EndsACherryPick)
-{
-    stopAt({"cherry-pick", "theirs"});
-    expectEnds({"CHERRY_PICK_HEAD", "MERGE_MSG"});
-}
-
-TEST_F(StateConclusion, EndsASequenceOfCherryPicks)
-{
-    repository_.git({"checkout", "--quiet", "theirs"});
-    repository_.commit("theirs, too");
-    repository_.git({"checkout", "--quiet", "main"});
-    stopAt({"cherry-pick", "theirs^", "theirs"});
-    expectEnds({"CHERRY_PICK_HEAD", "MERGE_MSG", "sequencer"});
-}
-
-TEST_F(StateConclusion, EndsASequenceOfReverts)
-{
-    repository_.write("file", "once more\n");
-    repository_.commitAll("second");
-    stopAt({"revert", "--no-edit", "HEAD^", "HEAD"});
-    expectEnds({"REVERT_HEAD", "MERGE_MSG", "sequencer"});
 }
 
 /// HEAD stays where the rebase left it, detached, and the branch where it was.
@@ -121,18 +131,6 @@ TEST_F(StateConclusion, EndsARebase)
     EXPECT_EQ(idOf("HEAD^"), idOf("theirs"));
     EXPECT_FALSE(repository_.tryGit({"symbolic-ref", "--quiet", "HEAD"}).succeeded());
     EXPECT_EQ(idOf("main"), main);
-}
-
-TEST_F(StateConclusion, EndsAnInteractiveRebase)
-{
-    stopAt({"-c", "sequence.editor=true", "rebase", "--interactive", "theirs"});
-    expectEnds({"rebase-merge", "rebase-merge/interactive", "MERGE_MSG"});
-}
-
-TEST_F(StateConclusion, EndsARebaseThatAppliesPatches)
-{
-    stopAt({"rebase", "--apply", "theirs"});
-    expectEnds({"rebase-apply"});
 }
 
 TEST_F(StateConclusion, EndsTheApplicationOfAMailbox)

@@ -17,7 +17,7 @@ namespace
 namespace git = vclink::git;
 using testing::ElementsAre;
 using testing::IsEmpty;
-using vclink::test::LogCapture;
+using namespace vclink::test;
 
 constexpr const char *const prefix = "Conflicted entry is not mergeable: ";
 
@@ -46,7 +46,7 @@ std::size_t checkoutsIn(const LogCapture &log)
 }
 
 /// Files in conflict whose attributes say that they must not hold markers.
-class UnmergeableConflicts : public vclink::test::MergeFixture
+class UnmergeableConflicts : public MergeFixture
 {
   protected:
     void attributes(const std::string &lines)
@@ -80,7 +80,7 @@ class UnmergeableConflicts : public vclink::test::MergeFixture
     }
     void expectStages(const std::string &name) const
     {
-        const auto stages = vclink::test::splitLines(repository_.git(
+        const auto stages = splitLines(repository_.git(
             {"--literal-pathspecs", "ls-files", "--unmerged", "--format=%(stage)", "--", name}));
         EXPECT_THAT(stages, ElementsAre("1", "2", "3")) << name;
     }
@@ -96,36 +96,14 @@ TEST_F(UnmergeableConflicts, AreNoneAmongTextFilesAndThereIsOneCheckout)
     EXPECT_EQ(checkoutsIn(log), 1U);
 }
 
-TEST_F(UnmergeableConflicts, WithTheMergeAttributeUnsetAreOurs)
-{
-    attributes("file -merge\n");
-    divergeIn({"file"});
-    const LogCapture log(git::SeverityDiagnostic | git::SeverityProgress);
-    expectConflicts("topic");
-    EXPECT_TRUE(isOurs("file"));
-    expectStages("file");
-    EXPECT_THAT(unmergeableIn(log), ElementsAre("file", "file", "file"));
-    EXPECT_EQ(checkoutsIn(log), 2U);
-}
-
-TEST_F(UnmergeableConflicts, ComeToTheSameAsInGit)
+TEST_F(UnmergeableConflicts, ComeToTheSameAsInGitInASecondCheckout)
 {
     attributes("file -merge\n");
     divergeIn({"file", "text"});
+    const LogCapture log(git::SeverityProgress);
     expectAsGit();
     EXPECT_TRUE(isOurs("file"));
     EXPECT_TRUE(hasMarkers("text"));
-}
-
-TEST_F(UnmergeableConflicts, ThatAreNoTextAndNameADriverAreOurs)
-{
-    attributes("file -text merge=anything\n");
-    divergeIn({"file"});
-    const LogCapture log(git::SeverityDiagnostic | git::SeverityProgress);
-    expectConflicts("topic");
-    EXPECT_TRUE(isOurs("file"));
-    expectStages("file");
-    EXPECT_THAT(unmergeableIn(log), ElementsAre("file", "file", "file"));
     EXPECT_EQ(checkoutsIn(log), 2U);
 }
 
@@ -190,70 +168,32 @@ TEST_F(UnmergeableConflicts, AreTheseStatesOfTheTwoAttributesAndNoOthers)
     }
 }
 
-TEST_F(UnmergeableConflicts, ThatWeDeletedHaveTwoStages)
-{
-    attributes("file -merge\n");
-    diverge([this] { repository_.remove("file"); },
-            [this] { repository_.write("file", "theirs\n"); });
-    const LogCapture log(git::SeverityDiagnostic);
-    expectConflicts("topic");
-    EXPECT_THAT(unmergeableIn(log), ElementsAre("file", "file"));
-    EXPECT_THAT(conflicts(), ElementsAre("1 file", "3 file"));
-}
-
-TEST_F(UnmergeableConflicts, ThatTheyDeletedHaveTwoStagesAndAreOurs)
-{
-    attributes("file -merge\n");
-    diverge([this] { repository_.write("file", "ours\n"); },
-            [this] { repository_.remove("file"); });
-    const LogCapture log(git::SeverityDiagnostic);
-    expectConflicts("topic");
-    EXPECT_THAT(unmergeableIn(log), ElementsAre("file", "file"));
-    EXPECT_THAT(conflicts(), ElementsAre("1 file", "2 file"));
-    EXPECT_EQ(repository_.read("file"), "ours\n");
-}
-
-TEST_F(UnmergeableConflicts, ThatBothAddedHaveTwoStagesAndAreOurs)
-{
-    attributes("new -merge\n");
-    diverge([this] { repository_.write("new", "ours\n"); },
-            [this] { repository_.write("new", "theirs\n"); });
-    const LogCapture log(git::SeverityDiagnostic);
-    expectConflicts("topic");
-    EXPECT_THAT(unmergeableIn(log), ElementsAre("new", "new"));
-    EXPECT_EQ(repository_.read("new"), "ours\n");
-}
-
-TEST_F(UnmergeableConflicts, KeepOurMode)
-{
-    attributes("file -merge\n");
-    diverge(
-        [this]
-        {
-            repository_.write("file", "ours\n");
-            repository_.setMode("file", 0755);
-        },
-        [this] { repository_.write("file", "theirs\n"); });
-    expectConflicts("topic");
-    EXPECT_EQ(repository_.read("file"), "ours\n");
-    EXPECT_NE(std::filesystem::status(repository_ / "file").permissions() &
-                  std::filesystem::perms::owner_exec,
-              std::filesystem::perms::none);
-}
-
-TEST_F(UnmergeableConflicts, OfLinksAreOurs)
+TEST_F(UnmergeableConflicts, OfTwoStagesAreOurs)
 {
     attributes("* -merge\n");
-    const auto linking = [this](const std::string &target)
-    {
-        repository_.remove("file");
-        repository_.symlink(target, "file");
-    };
-    linking("ancestor");
-    repository_.commitAll("link");
-    diverge([&] { linking("ours"); }, [&] { linking("theirs"); });
+    diverge(writes("new", "ours\n") + writes("file", "ours\n") + removes("other"),
+            writes("new", "theirs\n") + removes("file") + writes("other", "theirs\n"));
+    const LogCapture log(git::SeverityDiagnostic);
     expectConflicts("topic");
-    EXPECT_EQ(std::filesystem::read_symlink(repository_ / "file"), "ours");
+    EXPECT_THAT(unmergeableIn(log), ElementsAre("file", "file", "new", "new", "other", "other"));
+    EXPECT_THAT(conflicts(),
+                ElementsAre("1 file", "2 file", "2 new", "3 new", "1 other", "3 other"));
+    EXPECT_EQ(repository_.read("new"), "ours\n");
+    EXPECT_EQ(repository_.read("file"), "ours\n");
+}
+
+TEST_F(UnmergeableConflicts, OfLinksAreOursAndKeepOurMode)
+{
+    attributes("* -merge\n");
+    links("ancestor", "file")(repository_);
+    repository_.commitAll("link");
+    diverge(links("ours", "file") + writes("other", "ours\n") + makesExecutable("other"),
+            links("theirs", "file") + writes("other", "theirs\n"));
+    expectConflicts("topic");
+    EXPECT_EQ(workingTreeOf(repository_),
+              (RepositoryState::Entries{{".gitattributes", "644 * -merge\n"},
+                                        {"file", "link to ours"},
+                                        {"other", "755 ours\n"}}));
     expectStages("file");
 }
 
@@ -261,8 +201,7 @@ TEST_F(UnmergeableConflicts, OfLinksAreOurs)
 TEST_F(UnmergeableConflicts, WithAFolderOfTheirsInTheirPlaceTellThatInPlaceOfTheConflict)
 {
     attributes("new -merge\n");
-    diverge([this] { repository_.write("new", "ours\n"); },
-            [this] { repository_.write("new/inside", "theirs\n"); });
+    diverge(writing("new", "ours\n"), writing("new/inside", "theirs\n"));
     const std::string head = idOf("HEAD");
     EXPECT_THAT(failureOfMerge("topic"), testing::HasSubstr("Is a directory"));
     EXPECT_THAT(conflicts(), ElementsAre("2 new"));
@@ -272,55 +211,29 @@ TEST_F(UnmergeableConflicts, WithAFolderOfTheirsInTheirPlaceTellThatInPlaceOfThe
     EXPECT_EQ(branches().getRepositoryState(), "Conflicts");
 }
 
-TEST_F(UnmergeableConflicts, LeaveOtherFilesAlone)
+TEST_F(UnmergeableConflicts, FollowTheAttributesOfEachPlaceAndLeaveOtherFilesAlone)
 {
     attributes("*.bin -merge\n");
-    divergeIn({"a.bin", "b.txt", "folder/c.bin", "folder/d.txt"});
+    repository_.write("folder/.gitattributes", "*.in -merge\n");
+    repository_.write(".git/info/attributes", "info -merge\n");
+    divergeIn({"a.bin", "b.txt", "folder/c.bin", "folder/d.in", "d.in", "info", "more/e"});
+    repository_.write("more/.gitattributes", "e -merge\n");
     repository_.write("untracked", "mine\n");
     expectConflicts("topic");
-    EXPECT_TRUE(isOurs("a.bin"));
-    EXPECT_TRUE(isOurs("folder/c.bin"));
-    EXPECT_TRUE(hasMarkers("b.txt"));
-    EXPECT_TRUE(hasMarkers("folder/d.txt"));
+    for (const auto *name : {"a.bin", "folder/c.bin", "folder/d.in", "info", "more/e"})
+        EXPECT_TRUE(isOurs(name)) << name;
+    for (const auto *name : {"b.txt", "d.in"})
+        EXPECT_TRUE(hasMarkers(name)) << name;
     EXPECT_EQ(repository_.read("untracked"), "mine\n");
 }
 
 /// The attributes of the merge's own result count, since the files are written by then.
 TEST_F(UnmergeableConflicts, FollowTheAttributesThatTheirSideBrings)
 {
-    diverge([this] { repository_.write("file", "ours\n"); },
-            [this]
-            {
-                repository_.write("file", "theirs\n");
-                repository_.write(".gitattributes", "file -merge\n");
-            });
+    diverge(writes("file", "ours\n"),
+            writes("file", "theirs\n") + writes(".gitattributes", "file -merge\n"));
     expectConflicts("topic");
     EXPECT_EQ(repository_.read("file"), "ours\n");
-}
-
-TEST_F(UnmergeableConflicts, FollowTheAttributesOfAFolder)
-{
-    repository_.write("folder/.gitattributes", "*.bin -merge\n");
-    divergeIn({"folder/a.bin", "a.bin"});
-    expectConflicts("topic");
-    EXPECT_TRUE(isOurs("folder/a.bin"));
-    EXPECT_TRUE(hasMarkers("a.bin"));
-}
-
-TEST_F(UnmergeableConflicts, FollowTheAttributesOfAFileThatIsNotTracked)
-{
-    divergeIn({"file"});
-    repository_.write(".gitattributes", "file -merge\n");
-    expectConflicts("topic");
-    EXPECT_TRUE(isOurs("file"));
-}
-
-TEST_F(UnmergeableConflicts, FollowTheAttributesOfTheRepositoryAlone)
-{
-    repository_.write(".git/info/attributes", "file -merge\n");
-    divergeIn({"file"});
-    expectConflicts("topic");
-    EXPECT_TRUE(isOurs("file"));
 }
 
 const std::vector<std::string> hardNames{
@@ -335,60 +248,45 @@ const std::vector<std::string> hardNames{
 const std::vector<std::string> bystanders{"bin", "x",    "ab",   "a",    "aa", "a1",  "b",
                                           "f/b", "f/xx", "f1/x", "f2/x", "1",  "a1b", "xyz"};
 
-/// The names are unmergeable, and the bystanders are in conflict as text.
-class UnmergeableNamesTogether : public UnmergeableConflicts
+/// Each name alone, all together, and names that all begin dangerously or negate: libgit2 looks
+/// only below what all patterns of a list begin with.
+std::vector<std::vector<std::string>> listsOfNames()
 {
-  protected:
-    void expectOnlyTheseOurs(const std::vector<std::string> &names)
-    {
-        std::string lines = "* -merge\n";
-        for (const auto &bystander : bystanders)
-            lines += '/' + bystander + " merge\n";
-        attributes(lines);
-        auto all = bystanders;
-        all.insert(all.end(), names.begin(), names.end());
-        divergeIn(all);
-        const LogCapture log(git::SeverityDiagnostic);
-        expectConflicts("topic");
-        EXPECT_EQ(unmergeableIn(log).size(), 3 * names.size());
-        for (const auto &name : names)
-        {
-            EXPECT_TRUE(isOurs(name)) << testing::PrintToString(name);
-            EXPECT_THAT(unmergeableIn(log), testing::Contains(name)) << "the plain name";
-            expectStages(name);
-        }
-        for (const auto &bystander : bystanders)
-            EXPECT_TRUE(hasMarkers(bystander)) << bystander;
-    }
-};
+    std::vector<std::vector<std::string>> lists{hardNames, {"#bin", "#c"}, {"!bin", "!a"}};
+    for (const auto &name : hardNames)
+        lists.push_back({name});
+    return lists;
+}
 
-class UnmergeableNames : public UnmergeableNamesTogether,
-                         public testing::WithParamInterface<std::string>
+/// The names are unmergeable, and the bystanders are in conflict as text.
+class UnmergeableNames : public UnmergeableConflicts,
+                         public testing::WithParamInterface<std::vector<std::string>>
 {
 };
 
 TEST_P(UnmergeableNames, TouchNoOtherFileInConflict)
 {
-    expectOnlyTheseOurs({GetParam()});
+    const auto &names = GetParam();
+    std::string lines = "* -merge\n";
+    for (const auto &bystander : bystanders)
+        lines += '/' + bystander + " merge\n";
+    attributes(lines);
+    auto all = bystanders;
+    all.insert(all.end(), names.begin(), names.end());
+    divergeIn(all);
+    const LogCapture log(git::SeverityDiagnostic);
+    expectConflicts("topic");
+    EXPECT_EQ(unmergeableIn(log).size(), 3 * names.size());
+    for (const auto &name : names)
+    {
+        EXPECT_TRUE(isOurs(name)) << testing::PrintToString(name);
+        EXPECT_THAT(unmergeableIn(log), testing::Contains(name)) << "the plain name";
+        expectStages(name);
+    }
+    for (const auto &bystander : bystanders)
+        EXPECT_TRUE(hasMarkers(bystander)) << bystander;
 }
 
-INSTANTIATE_TEST_SUITE_P(OfEachKind, UnmergeableNames, testing::ValuesIn(hardNames),
-                         [](const auto &test) { return "Number" + std::to_string(test.index); });
-
-TEST_F(UnmergeableNamesTogether, OfAllKindsTouchNoOtherFileInConflict)
-{
-    expectOnlyTheseOurs(hardNames);
-}
-
-/// libgit2 looks only below what all patterns of a list begin with.
-TEST_F(UnmergeableNamesTogether, ThatAllBeginDangerouslyTouchNoOtherFileInConflict)
-{
-    expectOnlyTheseOurs({"#bin", "#c"});
-}
-
-TEST_F(UnmergeableNamesTogether, ThatAllNegateTouchNoOtherFileInConflict)
-{
-    expectOnlyTheseOurs({"!bin", "!a"});
-}
+INSTANTIATE_TEST_SUITE_P(OfEachKind, UnmergeableNames, testing::ValuesIn(listsOfNames()));
 
 } // namespace
