@@ -3,9 +3,12 @@
 #include <algorithm>
 #include <cstddef>
 #include <cstdint>
+#include <functional>
 #include <iterator>
 #include <string>
 #include <tuple>
+#include <utility>
+#include <vector>
 
 #include <git2.h>
 #include <gmock/gmock.h>
@@ -24,22 +27,34 @@ namespace git = vclink::git;
 using testing::ElementsAre;
 using testing::IsEmpty;
 using testing::SizeIs;
-using vclink::test::LibGit2Recorder;
-using vclink::test::LogCapture;
-using vclink::test::textOf;
+using namespace vclink::test;
 
-class CallsOnBranches : public vclink::test::BranchCallsFixture
+class CallsOnBranches : public BranchCallsFixture
 {
 };
 
-TEST_F(CallsOnBranches, OfAListAreTheseInOrder)
+TEST_F(CallsOnBranches, AreTheseInOrder)
 {
-    LibGit2Recorder calls;
-    branches().getLocalBranches();
-    EXPECT_THAT(calls.steps(),
-                ElementsAre("git_repository_open_ext", "git_branch_iterator_new", "git_branch_next",
-                            "git_reference_free", "git_branch_next", "git_branch_iterator_free",
-                            "git_repository_free"));
+    const Calls opening{"git_repository_open_ext"};
+    const Calls end{"git_reference_free", "git_repository_free"};
+    const auto make = [this] { branches().createBranch(git::BranchParameters("new", "main")); };
+    const std::vector<std::pair<std::function<void()>, Calls>> operations{
+        {[this] { branches().getLocalBranches(); },
+         {"git_branch_iterator_new", "git_branch_next", "git_reference_free", "git_branch_next",
+          "git_branch_iterator_free", "git_repository_free"}},
+        {make,
+         {"git_reference_dwim", "git_commit_lookup", "git_reference_free", "git_branch_create",
+          "git_reference_free", "git_commit_free", "git_repository_free"}},
+        {[this] { branches().deleteBranch("new"); },
+         joined({{"git_branch_lookup", "git_branch_delete"}, end})},
+        {[this] { branches().getCurrentBranch(); },
+         joined({{"git_repository_head", "git_branch_name"}, end})}};
+    for (const auto &[operation, expected] : operations)
+    {
+        LibGit2Recorder calls;
+        operation();
+        EXPECT_EQ(calls.steps(), joined({opening, expected}));
+    }
 }
 
 TEST_F(CallsOnBranches, OfASwitchAreTheseInOrderWithTheRecordOfASafeCheckout)
@@ -59,40 +74,11 @@ TEST_F(CallsOnBranches, OfASwitchAreTheseInOrderWithTheRecordOfASafeCheckout)
                 endOfTheLook_,
                 {"git_object_free", "git_reference_free", "git_repository_free"}}));
     ASSERT_THAT(checkouts_, SizeIs(1));
-    expectCheckoutRecord(checkouts_[0], vclink::test::libgit2Release::safeCheckout);
+    expectCheckoutRecord(checkouts_[0], libgit2Release::safeCheckout);
     EXPECT_THAT(checkoutPaths_[0], IsEmpty());
 }
 
-TEST_F(CallsOnBranches, OfANewBranchAreTheseInOrder)
-{
-    LibGit2Recorder calls;
-    branches().createBranch(git::BranchParameters("new", "main"));
-    EXPECT_THAT(calls.steps(),
-                ElementsAre("git_repository_open_ext", "git_reference_dwim", "git_commit_lookup",
-                            "git_reference_free", "git_branch_create", "git_reference_free",
-                            "git_commit_free", "git_repository_free"));
-}
-
-TEST_F(CallsOnBranches, OfADeletionAreTheseInOrder)
-{
-    repository_.git({"branch", "old"});
-    LibGit2Recorder calls;
-    branches().deleteBranch("old");
-    EXPECT_THAT(calls.steps(),
-                ElementsAre("git_repository_open_ext", "git_branch_lookup", "git_branch_delete",
-                            "git_reference_free", "git_repository_free"));
-}
-
-TEST_F(CallsOnBranches, OfTheCurrentBranchAreTheseInOrder)
-{
-    LibGit2Recorder calls;
-    EXPECT_EQ(branches().getCurrentBranch().getName(), "main");
-    EXPECT_THAT(calls.steps(),
-                ElementsAre("git_repository_open_ext", "git_repository_head", "git_branch_name",
-                            "git_reference_free", "git_repository_free"));
-}
-
-class CallsOfAMerge : public vclink::test::BranchCallsFixture
+class CallsOfAMerge : public BranchCallsFixture
 {
   protected:
     void makeConflicts()
@@ -100,17 +86,8 @@ class CallsOfAMerge : public vclink::test::BranchCallsFixture
         repository_.write(".gitattributes", "binary -merge\n");
         repository_.write("binary", "ancestor\n");
         repository_.commitAll("attributes");
-        diverge(
-            [this]
-            {
-                repository_.write("file", "ours\n");
-                repository_.write("binary", "ours\n");
-            },
-            [this]
-            {
-                repository_.write("file", "theirs\n");
-                repository_.write("binary", "theirs\n");
-            });
+        diverge(writes("file", "ours\n") + writes("binary", "ours\n"),
+                writes("file", "theirs\n") + writes("binary", "theirs\n"));
     }
     /// Expects the values that libgit2 gives.
     static void expectUnchanged(const git_merge_options &options)
@@ -151,7 +128,7 @@ TEST_F(CallsOfAMerge, OfAFastForwardAreTheseInOrder)
                       {"git_object_free", "git_reference_free", "git_annotated_commit_free",
                        "git_repository_free"}}));
     ASSERT_THAT(checkouts_, SizeIs(1));
-    expectCheckoutRecord(checkouts_[0], vclink::test::libgit2Release::safeCheckout);
+    expectCheckoutRecord(checkouts_[0], libgit2Release::safeCheckout);
     EXPECT_THAT(checkoutPaths_[0], IsEmpty());
 }
 
@@ -172,7 +149,7 @@ TEST_F(CallsOfAMerge, OfAMergeThatFailsReleaseAllBeforeTheExceptionIsMade)
     calls.fail({{"git_merge", GIT_ERROR}});
     LogCapture log(git::SeverityException);
     std::string last;
-    log.onRecord([&](const vclink::test::LogRecord &) { last = calls.steps().back(); });
+    log.onRecord([&](const LogRecord &) { last = calls.steps().back(); });
     failureOfMerge("topic");
     EXPECT_EQ(last, "git_repository_free");
 }

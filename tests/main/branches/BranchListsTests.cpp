@@ -1,5 +1,4 @@
 // SPDX-License-Identifier: MIT
-#include <algorithm>
 #include <string>
 #include <type_traits>
 #include <vector>
@@ -8,7 +7,6 @@
 #include <gtest/gtest.h>
 
 #include "BranchFixture.hpp"
-#include "support/Descriptors.hpp"
 
 namespace
 {
@@ -16,14 +14,9 @@ namespace
 using testing::ElementsAre;
 using testing::IsEmpty;
 using vclink::git::BranchPointer;
-using vclink::test::Failure;
-using vclink::test::failureOf;
-using vclink::test::GitRepository;
-using vclink::test::namesOf;
-using vclink::test::NothingChanges;
-using vclink::test::splitLines;
+using namespace vclink::test;
 
-class BranchLists : public vclink::test::BranchFixture
+class BranchLists : public BranchFixture
 {
   protected:
     std::vector<std::string> local() const
@@ -38,48 +31,49 @@ class BranchLists : public vclink::test::BranchFixture
     {
         return splitLines(repository_.git({"for-each-ref", "--format=%(refname)", below}));
     }
-    void makeRemoteBranch(const std::string &name) const
-    {
-        repository_.git({"update-ref", "refs/remotes/" + name, "HEAD"});
-    }
 };
 
-TEST_F(BranchLists, AreEmptyBeforeTheFirstCommit)
+TEST_F(BranchLists, AreEmptyBeforeTheFirstCommitAndWithADetachedHeadAlone)
 {
-    const NothingChanges nothing(repository_);
-    EXPECT_THAT(local(), IsEmpty());
-    EXPECT_THAT(remote(), IsEmpty());
+    for (const bool hasCommit : {false, true})
+    {
+        if (hasCommit)
+        {
+            repository_.commitAll("first");
+            repository_.git({"checkout", "--quiet", "--detach"});
+            repository_.git({"branch", "-D", "main"});
+        }
+        const NothingChanges nothing(repository_);
+        EXPECT_THAT(local(), IsEmpty());
+        EXPECT_THAT(remote(), IsEmpty());
+    }
 }
 
-TEST_F(BranchLists, AreEmptyWithADetachedHeadAndNoBranch)
-{
-    repository_.commitAll("first");
-    repository_.git({"checkout", "--quiet", "--detach"});
-    repository_.git({"branch", "-D", "main"});
-    EXPECT_THAT(local(), IsEmpty());
-}
-
-TEST_F(BranchLists, HoldFullNamesWhereTheCurrentBranchHasAShortOne)
+/// Packed and loose, leading to another, with names that are no ASCII and no UTF-8; what is no
+/// branch, or broken, is left out. The manager was made before all of them.
+TEST_F(BranchLists, HoldTheFullNameOfEachBranchOnceOnItsOwnSideAsGitDoes)
 {
     repository_.commitAll("first");
     EXPECT_THAT(local(), ElementsAre("refs/heads/main"));
-    EXPECT_EQ(branches().getCurrentBranch().getName(), "main");
-    EXPECT_NE(branches().getLocalBranches().front(), branches().getCurrentBranch());
-}
-
-TEST_F(BranchLists, HoldEachBranchOnItsOwnSide)
-{
-    repository_.commitAll("first");
-    repository_.git({"branch", "folder/topic"});
-    repository_.git({"branch", "another"});
+    for (const std::string name : {"folder/topic", "gr\xC3\xBC\xC3\x9F", "caf\xE9", "dropped"})
+        repository_.git({"branch", name});
+    repository_.git({"pack-refs", "--all"});
+    repository_.git({"branch", "-D", "dropped"});
+    repository_.git({"branch", "loose"});
     repository_.git({"tag", "v1"});
-    makeRemoteBranch("origin/main");
-    makeRemoteBranch("upstream/topic");
-    EXPECT_THAT(local(),
-                ElementsAre("refs/heads/another", "refs/heads/folder/topic", "refs/heads/main"));
+    repository_.git({"symbolic-ref", "refs/heads/alias", "refs/heads/main"});
+    repository_.write(".git/refs/heads/broken", "garbage\n");
+    repository_.commitAll("main is loose, too");
+    for (const std::string name : {"origin/main", "upstream/topic"})
+        repository_.git({"update-ref", "refs/remotes/" + name, "HEAD"});
+    const std::vector<std::string> expected{"refs/heads/alias", "refs/heads/caf\xE9",
+                                            "refs/heads/loose", "refs/heads/folder/topic",
+                                            "refs/heads/main",  "refs/heads/gr\xC3\xBC\xC3\x9F"};
+    EXPECT_THAT(local(), testing::UnorderedElementsAreArray(expected));
+    EXPECT_THAT(local(), testing::UnorderedElementsAreArray(byGit("refs/heads")));
     EXPECT_THAT(remote(), ElementsAre("refs/remotes/origin/main", "refs/remotes/upstream/topic"));
-    EXPECT_EQ(local(), byGit("refs/heads"));
     EXPECT_EQ(remote(), byGit("refs/remotes"));
+    EXPECT_EQ(branches().getCurrentBranch().getName(), "main");
 }
 
 TEST_F(BranchLists, HoldTheHeadOfAClonedRemoteAsABranchOfItsOwn)
@@ -89,54 +83,6 @@ TEST_F(BranchLists, HoldTheHeadOfAClonedRemoteAsABranchOfItsOwn)
     const auto adapter = makeAdapter(clone.path());
     EXPECT_THAT(namesOf(vclink::git::BranchManager::create(*adapter)->getRemoteBranches()),
                 ElementsAre("refs/remotes/origin/HEAD", "refs/remotes/origin/main"));
-}
-
-TEST_F(BranchLists, HoldPackedAndLooseBranches)
-{
-    repository_.commitAll("first");
-    repository_.git({"branch", "packed"});
-    repository_.git({"pack-refs", "--all"});
-    repository_.git({"branch", "loose"});
-    auto names = local();
-    std::sort(names.begin(), names.end());
-    EXPECT_EQ(names, byGit("refs/heads"));
-    EXPECT_EQ(names.size(), 3U);
-}
-
-TEST_F(BranchLists, GiveEachNameOnceWhenItIsPackedAndLoose)
-{
-    repository_.commitAll("first");
-    repository_.git({"pack-refs", "--all"});
-    repository_.commitAll("second");
-    EXPECT_THAT(local(), ElementsAre("refs/heads/main"));
-}
-
-TEST_F(BranchLists, HoldNamesThatAreNoAscii)
-{
-    repository_.commitAll("first");
-    const std::string utf8 = "gr\xC3\xBC\xC3\x9F";
-    const std::string noUtf8 = "caf\xE9";
-    repository_.git({"branch", utf8});
-    repository_.git({"branch", noUtf8});
-    EXPECT_THAT(local(), testing::UnorderedElementsAre("refs/heads/main", "refs/heads/" + utf8,
-                                                       "refs/heads/" + noUtf8));
-}
-
-TEST_F(BranchLists, HoldABranchThatLeadsToAnother)
-{
-    repository_.commitAll("first");
-    repository_.git({"symbolic-ref", "refs/heads/alias", "refs/heads/main"});
-    EXPECT_THAT(local(), ElementsAre("refs/heads/alias", "refs/heads/main"));
-}
-
-TEST_F(BranchLists, SeeWhatChangedSinceTheManagerWasMade)
-{
-    repository_.commitAll("first");
-    EXPECT_THAT(local(), ElementsAre("refs/heads/main"));
-    repository_.git({"branch", "later"});
-    EXPECT_THAT(local(), ElementsAre("refs/heads/later", "refs/heads/main"));
-    repository_.git({"branch", "-D", "later"});
-    EXPECT_THAT(local(), ElementsAre("refs/heads/main"));
 }
 
 TEST_F(BranchLists, OfManyBranchesAreWhole)
@@ -150,24 +96,6 @@ TEST_F(BranchLists, OfManyBranchesAreWhole)
     repository_.git({"pack-refs", "--all"});
     EXPECT_EQ(local(), byGit("refs/heads"));
     EXPECT_EQ(local().size(), 2001U);
-}
-
-TEST_F(BranchLists, LeaveNoDescriptorOpen)
-{
-    repository_.commitAll("first");
-    local();
-    const vclink::test::NoDescriptorLeak noLeak;
-    local();
-    remote();
-}
-
-TEST_F(BranchLists, LeaveOutABranchThatIsBrokenAsGitDoes)
-{
-    repository_.commitAll("first");
-    repository_.write(".git/refs/heads/broken", "garbage\n");
-    repository_.git({"branch", "whole"});
-    EXPECT_THAT(local(), ElementsAre("refs/heads/main", "refs/heads/whole"));
-    EXPECT_EQ(local(), byGit("refs/heads"));
 }
 
 TEST_F(BranchLists, FailWhereTheRepositoryCannotBeOpened)
@@ -189,19 +117,16 @@ TEST_F(BranchLists, AreOfOneWorkingCopyAndShownInEach)
     EXPECT_EQ(manager->getCurrentBranch().getName(), "second");
 }
 
-TEST(BranchPointerValue, HoldsItsNameAsGiven)
+TEST(BranchPointerValue, HoldsACopyOfItsName)
 {
-    const BranchPointer branch("caf\xE9/x");
-    EXPECT_EQ(branch.getName(), "caf\xE9/x");
-    EXPECT_TRUE((std::is_same_v<decltype(branch.getName()), std::string>)) << "a copy";
-}
-
-TEST(BranchPointerValue, LeavesTheCallersNameAlone)
-{
-    const std::string name = "topic/of-more-than-a-few-characters";
-    const BranchPointer branch(name);
-    EXPECT_EQ(branch.getName(), name);
-    EXPECT_EQ(name, "topic/of-more-than-a-few-characters");
+    const std::string name = "caf\xE9/of-more-than-a-few-characters";
+    BranchPointer first(name);
+    const BranchPointer copy = first;
+    first = BranchPointer("two");
+    EXPECT_EQ(copy.getName(), name);
+    EXPECT_EQ(name, "caf\xE9/of-more-than-a-few-characters");
+    EXPECT_EQ(first.getName(), "two");
+    EXPECT_TRUE((std::is_same_v<decltype(copy.getName()), std::string>)) << "a copy";
 }
 
 TEST(BranchPointerValue, ComparesNamesExactly)
@@ -214,15 +139,6 @@ TEST(BranchPointerValue, ComparesNamesExactly)
         EXPECT_FALSE(branch == BranchPointer(other)) << other;
         EXPECT_TRUE(branch != BranchPointer(other)) << other;
     }
-}
-
-TEST(BranchPointerValue, IsCopiedAndAssigned)
-{
-    BranchPointer first("one");
-    const BranchPointer copy = first;
-    first = BranchPointer("two");
-    EXPECT_EQ(copy.getName(), "one");
-    EXPECT_EQ(first.getName(), "two");
 }
 
 } // namespace

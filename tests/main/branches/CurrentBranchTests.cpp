@@ -15,19 +15,15 @@
 #include "main/BasicBranchManager.hpp"
 #include "main/OtherAdapter.hpp"
 #include "main/merge/BranchMerger.hpp"
-#include "support/Descriptors.hpp"
 
 namespace
 {
 
 using vclink::git::BasicBranchManager;
 using vclink::git::BranchManager;
-using vclink::test::Failure;
-using vclink::test::failureOf;
-using vclink::test::NothingChanges;
-using vclink::test::slotOf;
+using namespace vclink::test;
 
-class CurrentBranch : public vclink::test::BranchFixture
+class CurrentBranch : public BranchFixture
 {
   protected:
     std::string name() const
@@ -47,16 +43,14 @@ TEST_F(CurrentBranch, HasItsShortName)
     }
 }
 
-TEST_F(CurrentBranch, IsNoneBeforeTheFirstCommit)
+TEST_F(CurrentBranch, IsNoneBeforeTheFirstCommitOrOnADetachedHead)
 {
-    const NothingChanges nothing(repository_);
-    const Failure failure = failureOf([this] { name(); });
-    EXPECT_EQ(failure.code, GIT_EUNBORNBRANCH);
-    EXPECT_EQ(failure.text, "reference 'refs/heads/main' not found");
-}
-
-TEST_F(CurrentBranch, IsNoneOnADetachedHead)
-{
+    {
+        const NothingChanges nothing(repository_);
+        const Failure failure = failureOf([this] { name(); });
+        EXPECT_EQ(failure.code, GIT_EUNBORNBRANCH);
+        EXPECT_EQ(failure.text, "reference 'refs/heads/main' not found");
+    }
     repository_.commitAll("first");
     repository_.git({"checkout", "--quiet", "--detach"});
     const NothingChanges nothing(repository_);
@@ -65,88 +59,43 @@ TEST_F(CurrentBranch, IsNoneOnADetachedHead)
     EXPECT_EQ(failure.text, "reference 'HEAD' is neither a local nor a remote branch.");
 }
 
-TEST_F(CurrentBranch, IsNoneWhereTheRepositoryCannotBeOpened)
-{
-    repository_.remove(".git");
-    EXPECT_EQ(failureOf([this] { name(); }).code, GIT_ENOTFOUND);
-}
-
-TEST_F(CurrentBranch, FollowsWhatOthersDo)
-{
-    repository_.commitAll("first");
-    EXPECT_EQ(name(), "main");
-    repository_.git({"checkout", "--quiet", "-b", "topic"});
-    EXPECT_EQ(name(), "topic");
-}
-
-TEST_F(CurrentBranch, LeavesNoDescriptorOpen)
-{
-    repository_.commitAll("first");
-    name();
-    const vclink::test::NoDescriptorLeak noLeak;
-    EXPECT_EQ(name(), "main");
-}
-
-class BranchManagerObject : public vclink::test::BranchFixture
+class BranchManagerObject : public BranchFixture
 {
 };
 
-TEST_F(BranchManagerObject, IsMadeForAGitAdapter)
+TEST_F(BranchManagerObject, IsMadeForAGitAdapterAloneAndOpensNoRepositoryThen)
 {
-    const auto manager = BranchManager::create(*adapter_);
+    const auto adapter = makeAdapter(folder() / "missing");
+    const auto manager = BranchManager::create(*adapter);
     const BranchManager &base = *manager;
     EXPECT_EQ(typeid(base), typeid(BasicBranchManager));
     EXPECT_TRUE((std::is_same_v<decltype(BranchManager::create(*adapter_)),
                                 std::unique_ptr<BranchManager>>));
-}
-
-TEST_F(BranchManagerObject, IsMadeForNoOtherAdapter)
-{
-    vclink::test::OtherAdapter other;
+    OtherAdapter other;
     EXPECT_THROW(static_cast<void>(BranchManager::create(other)), std::bad_cast);
 }
 
-TEST_F(BranchManagerObject, OpensNoRepositoryWhenItIsMade)
-{
-    const auto adapter = makeAdapter(folder() / "missing");
-    EXPECT_NO_THROW(static_cast<void>(BranchManager::create(*adapter)));
-}
-
-TEST_F(BranchManagerObject, SharesTheFactoryAndBorrowsTheCallbacks)
-{
-    const auto adapter = makeAdapter(repository_.path());
-    const auto factory = adapter->getOptionsFactory();
-    ASSERT_EQ(factory.use_count(), 2);
-    auto manager = BranchManager::create(*adapter);
-    EXPECT_EQ(factory.use_count(), 3);
-    manager.reset();
-    EXPECT_EQ(factory.use_count(), 2);
-}
-
-/// Adapter, factory, callbacks.
-TEST_F(BranchManagerObject, HasItsMembersInOrder)
-{
-    const BasicBranchManager manager(*adapter_);
-    ASSERT_EQ(sizeof(manager), 5 * sizeof(void *));
-    const void *words[5];
-    std::memcpy(words, static_cast<const void *>(&manager), sizeof(words));
-    EXPECT_EQ(words[1], adapter_.get());
-    EXPECT_EQ(words[2], adapter_->getOptionsFactory().get());
-    EXPECT_EQ(words[4], &adapter_->getCallbacks());
-}
-
-TEST_F(BranchManagerObject, HasItsMergerWithTheSameMembers)
+/// The adapter and the callbacks are borrowed, the factory is shared.
+TEST_F(BranchManagerObject, HasItsMembersInOrderAsItsMergerHas)
 {
     const auto factory = adapter_->getOptionsFactory();
     const long shares = factory.use_count();
     const vclink::git::BranchMerger merger(*adapter_, factory, adapter_->getCallbacks());
     EXPECT_EQ(factory.use_count(), shares + 1);
+    const BasicBranchManager manager(*adapter_);
+    EXPECT_EQ(factory.use_count(), shares + 2);
     ASSERT_EQ(sizeof(merger), 4 * sizeof(void *));
-    const void *words[4];
-    std::memcpy(words, static_cast<const void *>(&merger), sizeof(words));
-    EXPECT_EQ(words[0], adapter_.get());
-    EXPECT_EQ(words[1], factory.get());
-    EXPECT_EQ(words[3], &adapter_->getCallbacks());
+    ASSERT_EQ(sizeof(manager), 5 * sizeof(void *));
+    const void *words[9];
+    std::memcpy(words, static_cast<const void *>(&merger), sizeof(merger));
+    std::memcpy(words + 4, static_cast<const void *>(&manager), sizeof(manager));
+    // The manager's first is that of its virtual functions.
+    for (const int first : {0, 5})
+    {
+        EXPECT_EQ(words[first], adapter_.get());
+        EXPECT_EQ(words[first + 1], factory.get());
+        EXPECT_EQ(words[first + 3], &adapter_->getCallbacks());
+    }
 }
 
 TEST_F(BranchManagerObject, HasItsOperationsInTheOrderThatHostsCountOn)
@@ -165,10 +114,6 @@ TEST_F(BranchManagerObject, HasItsOperationsInTheOrderThatHostsCountOn)
     EXPECT_TRUE(
         (std::is_same_v<decltype(&BranchManager::merge), void (BranchManager::*)(std::string)>))
         << "the name comes by value";
-}
-
-TEST_F(BranchManagerObject, IsNotCopied)
-{
     EXPECT_FALSE(std::is_copy_constructible_v<BranchManager>);
     EXPECT_FALSE(std::is_copy_assignable_v<BranchManager>);
 }

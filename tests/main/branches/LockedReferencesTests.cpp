@@ -21,8 +21,7 @@ namespace
 namespace fs = std::filesystem;
 using std::chrono::milliseconds;
 using vclink::git::BranchParameters;
-using vclink::test::failureOf;
-using vclink::test::stateOf;
+using namespace vclink::test;
 using Steady = std::chrono::steady_clock;
 
 /// An operation that changes a reference, and the lock that it meets.
@@ -56,8 +55,7 @@ const std::vector<ReferenceChange> &referenceChanges()
     return all;
 }
 
-class LockedReference : public vclink::test::MergeFixture,
-                        public testing::WithParamInterface<ReferenceChange>
+class LockedReference : public MergeFixture, public testing::WithParamInterface<ReferenceChange>
 {
   protected:
     LockedReference()
@@ -101,7 +99,7 @@ class LockedReference : public vclink::test::MergeFixture,
     }
     std::vector<std::string> reflogOf(const std::string &reference) const
     {
-        return vclink::test::splitLines(repository_.tryGit({"reflog", "show", reference}).output);
+        return splitLines(repository_.tryGit({"reflog", "show", reference}).output);
     }
 };
 
@@ -129,8 +127,7 @@ TEST_P(LockedReference, IsWaitedFor)
               twin.git({"for-each-ref", "--format=%(refname) %(tree)"}));
     EXPECT_EQ(repository_.read(".git/HEAD"), twin.read(".git/HEAD"));
     EXPECT_LE(reflogOf("HEAD").size(), before + 1);
-    EXPECT_EQ(reflogOf("HEAD").size(),
-              vclink::test::splitLines(twin.git({"reflog", "show", "HEAD"})).size());
+    EXPECT_EQ(reflogOf("HEAD").size(), splitLines(twin.git({"reflog", "show", "HEAD"})).size());
 }
 
 TEST_P(LockedReference, FailsOnceTheTimeIsOver)
@@ -138,14 +135,14 @@ TEST_P(LockedReference, FailsOnceTheTimeIsOver)
     repository_.write(lock(), "of another process");
     const std::string references = repository_.git({"for-each-ref"});
     const std::string head = repository_.read(".git/HEAD");
-    const auto files = vclink::test::workingTreeOf(repository_);
+    const auto files = workingTreeOf(repository_);
     const auto begin = Steady::now();
     EXPECT_EQ(codeOf(), GIT_ELOCKED);
     EXPECT_GE(Steady::now() - begin, milliseconds(100));
     EXPECT_EQ(repository_.read(lock()), "of another process");
     EXPECT_EQ(repository_.git({"for-each-ref"}), references);
     EXPECT_EQ(repository_.read(".git/HEAD"), head);
-    EXPECT_EQ(vclink::test::workingTreeOf(repository_), files);
+    EXPECT_EQ(workingTreeOf(repository_), files);
     EXPECT_EQ(repository_.git({"status", "--porcelain"}), "");
     EXPECT_FALSE(fs::exists(repository_ / ".git/index.lock"));
     repository_.remove(lock());
@@ -169,7 +166,7 @@ INSTANTIATE_TEST_SUITE_P(Of, LockedReference, testing::ValuesIn(referenceChanges
                          [](const auto &test) { return test.param.name; });
 
 /// A lock that is taken while files are being written.
-class LateLock : public vclink::test::MergeFixture
+class LateLock : public MergeFixture
 {
   protected:
     LateLock()

@@ -9,6 +9,7 @@
 
 #include "BranchFixture.hpp"
 #include "main/BasicBranchManager.hpp"
+#include "support/Sentence.hpp"
 #include "vclink/git/GitException.hpp"
 
 namespace
@@ -16,11 +17,10 @@ namespace
 
 using testing::HasSubstr;
 using vclink::git::describeRepositoryState;
-using vclink::test::failureOf;
-using vclink::test::NothingChanges;
+using namespace vclink::test;
 
 /// "main" and "topic", which both change "file", and "topic" one commit more.
-class RepositoryStateText : public vclink::test::BranchFixture
+class RepositoryStateText : public BranchFixture
 {
   protected:
     RepositoryStateText()
@@ -46,17 +46,73 @@ class RepositoryStateText : public vclink::test::BranchFixture
         const NothingChanges nothing(repository_);
         EXPECT_EQ(branches().getRepositoryState(), text);
     }
-    /// Stops at a conflict.
-    void begin(const std::vector<std::string> &command) const
-    {
-        ASSERT_FALSE(repository_.tryGit(command).succeeded());
-    }
 };
 
-TEST_F(RepositoryStateText, IsNormalWhenNothingIsUnderWay)
+/// What is under way, as text and as libgit2's number, and the commands of git that lead there; the
+/// last may stop at a conflict.
+struct UnderWay : Sentence
 {
-    expectState("Normal", GIT_REPOSITORY_STATE_NONE);
+    std::string text;
+    git_repository_state_t number;
+    std::vector<std::vector<std::string>> commands = {};
+    std::string folder = {};
+};
+
+class RepositoryStateUnderWay : public RepositoryStateText,
+                                public testing::WithParamInterface<UnderWay>
+{
+};
+
+TEST_P(RepositoryStateUnderWay, HasItsText)
+{
+    for (const auto &command : GetParam().commands)
+        repository_.tryGit(command);
+    if (!GetParam().folder.empty())
+        repository_.makeFolder(GetParam().folder);
+    expectState(GetParam().text, GetParam().number);
 }
+
+const UnderWay allUnderWay[]{
+    {{"Nothing"}, "Normal", GIT_REPOSITORY_STATE_NONE},
+    {{"AMerge"}, "Conflicts", GIT_REPOSITORY_STATE_MERGE, {{"merge", "topic"}}},
+    {{"AMergeWithoutConflicts"},
+     "Conflicts",
+     GIT_REPOSITORY_STATE_MERGE,
+     {{"merge", "--quiet", "--no-commit", "-s", "ours", "topic"}}},
+    {{"ARevert"}, "Conflicts", GIT_REPOSITORY_STATE_REVERT, {{"revert", "--no-edit", "HEAD~1"}}},
+    {{"ARevertOfSeveral"},
+     "Conflicts",
+     GIT_REPOSITORY_STATE_REVERT_SEQUENCE,
+     {{"revert", "--no-edit", "topic~1", "topic"}}},
+    {{"ACherryPick"}, "Conflicts", GIT_REPOSITORY_STATE_CHERRYPICK, {{"cherry-pick", "topic"}}},
+    {{"ACherryPickOfSeveral"},
+     "Conflicts",
+     GIT_REPOSITORY_STATE_CHERRYPICK_SEQUENCE,
+     {{"cherry-pick", "topic~1", "topic"}}},
+    {{"ABisection"}, "Bisecting", GIT_REPOSITORY_STATE_BISECT, {{"bisect", "start"}}},
+    {{"ARebaseOfPatches"}, "Rebase", GIT_REPOSITORY_STATE_REBASE, {{"rebase", "--apply", "topic"}}},
+    {{"AnInteractiveRebase"},
+     "Rebase interactive",
+     GIT_REPOSITORY_STATE_REBASE_INTERACTIVE,
+     {{"-c", "sequence.editor=true", "rebase", "--interactive", "topic"}}},
+    {{"ARebaseByMerging"},
+     "Rebase w/merge",
+     GIT_REPOSITORY_STATE_REBASE_MERGE,
+     {},
+     ".git/rebase-merge"},
+    {{"TheApplicationOfAMailbox"},
+     "Apply mailbox",
+     GIT_REPOSITORY_STATE_APPLY_MAILBOX,
+     {{"format-patch", "--quiet", "--output=.git/patch", "-1", "topic"}, {"am", ".git/patch"}}},
+    {{"EitherRebaseOrPatches"},
+     "Rebase/Apply mailbox",
+     GIT_REPOSITORY_STATE_APPLY_MAILBOX_OR_REBASE,
+     {},
+     ".git/rebase-apply"},
+};
+
+INSTANTIATE_TEST_SUITE_P(Of, RepositoryStateUnderWay, testing::ValuesIn(allUnderWay),
+                         testing::PrintToStringParamName());
 
 TEST_F(RepositoryStateText, IsNormalBeforeTheFirstCommit)
 {
@@ -65,90 +121,11 @@ TEST_F(RepositoryStateText, IsNormalBeforeTheFirstCommit)
     EXPECT_EQ(vclink::git::BranchManager::create(*adapter)->getRepositoryState(), "Normal");
 }
 
-TEST_F(RepositoryStateText, IsConflictsDuringAMerge)
-{
-    begin({"merge", "topic"});
-    expectState("Conflicts", GIT_REPOSITORY_STATE_MERGE);
-}
-
-TEST_F(RepositoryStateText, IsConflictsDuringAMergeOfTheManagersOwn)
-{
-    EXPECT_ANY_THROW(branches().merge("topic"));
-    expectState("Conflicts", GIT_REPOSITORY_STATE_MERGE);
-}
-
-TEST_F(RepositoryStateText, IsConflictsDuringAMergeWithoutConflicts)
-{
-    repository_.git({"merge", "--quiet", "--no-commit", "-s", "ours", "topic"});
-    expectState("Conflicts", GIT_REPOSITORY_STATE_MERGE);
-}
-
-TEST_F(RepositoryStateText, IsConflictsDuringARevert)
-{
-    begin({"revert", "--no-edit", "HEAD~1"});
-    expectState("Conflicts", GIT_REPOSITORY_STATE_REVERT);
-}
-
-TEST_F(RepositoryStateText, IsConflictsDuringARevertOfSeveral)
-{
-    begin({"revert", "--no-edit", "topic~1", "topic"});
-    expectState("Conflicts", GIT_REPOSITORY_STATE_REVERT_SEQUENCE);
-}
-
-TEST_F(RepositoryStateText, IsConflictsDuringACherryPick)
-{
-    begin({"cherry-pick", "topic"});
-    expectState("Conflicts", GIT_REPOSITORY_STATE_CHERRYPICK);
-}
-
-TEST_F(RepositoryStateText, IsConflictsDuringACherryPickOfSeveral)
-{
-    begin({"cherry-pick", "topic~1", "topic"});
-    expectState("Conflicts", GIT_REPOSITORY_STATE_CHERRYPICK_SEQUENCE);
-}
-
-TEST_F(RepositoryStateText, IsBisectingDuringABisection)
-{
-    repository_.git({"bisect", "start"});
-    expectState("Bisecting", GIT_REPOSITORY_STATE_BISECT);
-}
-
-TEST_F(RepositoryStateText, IsRebaseDuringARebaseOfPatches)
-{
-    begin({"rebase", "--apply", "topic"});
-    expectState("Rebase", GIT_REPOSITORY_STATE_REBASE);
-}
-
-TEST_F(RepositoryStateText, IsRebaseInteractiveDuringAnInteractiveRebase)
-{
-    begin({"-c", "sequence.editor=true", "rebase", "--interactive", "topic"});
-    expectState("Rebase interactive", GIT_REPOSITORY_STATE_REBASE_INTERACTIVE);
-}
-
-TEST_F(RepositoryStateText, IsRebaseWithMergeDuringARebaseByMerging)
-{
-    repository_.makeFolder(".git/rebase-merge");
-    expectState("Rebase w/merge", GIT_REPOSITORY_STATE_REBASE_MERGE);
-}
-
-TEST_F(RepositoryStateText, IsApplyMailboxWhilePatchesAreApplied)
-{
-    const std::string patch = repository_.git({"format-patch", "--stdout", "-1", "topic"});
-    EXPECT_FALSE(repository_.command({"am"}).input(patch).run().succeeded());
-    expectState("Apply mailbox", GIT_REPOSITORY_STATE_APPLY_MAILBOX);
-}
-
-TEST_F(RepositoryStateText, IsEitherWhereRebaseAndPatchesCannotBeTold)
-{
-    repository_.makeFolder(".git/rebase-apply");
-    expectState("Rebase/Apply mailbox", GIT_REPOSITORY_STATE_APPLY_MAILBOX_OR_REBASE);
-}
-
 TEST_F(RepositoryStateText, OfALinkedWorktreeIsItsOwn)
 {
     const std::string linked = folder() / "linked";
     repository_.git({"worktree", "add", "--quiet", "-b", "second", linked});
-    const vclink::test::GitRepository worktree(linked);
+    const GitRepository worktree(linked);
     EXPECT_FALSE(worktree.tryGit({"merge", "topic"}).succeeded());
     const auto adapter = makeAdapter(linked);
     EXPECT_EQ(vclink::git::BranchManager::create(*adapter)->getRepositoryState(), "Conflicts");
@@ -184,7 +161,7 @@ TEST_F(RepositoryStateText, IsNormalWhereMergeHeadCannotBeLookedAt)
     EXPECT_TRUE(status().empty());
 }
 
-TEST_F(RepositoryStateText, HasAWordForEachNumber)
+TEST_F(RepositoryStateText, HasAWordForEachNumberAndNoneForOthers)
 {
     const std::vector<std::string> texts{"Normal",         "Conflicts",     "Conflicts",
                                          "Conflicts",      "Conflicts",     "Conflicts",
@@ -192,10 +169,6 @@ TEST_F(RepositoryStateText, HasAWordForEachNumber)
                                          "Rebase w/merge", "Apply mailbox", "Rebase/Apply mailbox"};
     for (std::size_t i = 0; i < texts.size(); ++i)
         EXPECT_EQ(describeRepositoryState(static_cast<int>(i)), texts[i]) << i;
-}
-
-TEST_F(RepositoryStateText, IsEmptyForAnyOtherNumber)
-{
     for (const int number : {-1, 12, 13, 100, -1000})
         EXPECT_EQ(describeRepositoryState(number), "") << number;
 }

@@ -12,7 +12,6 @@
 #include "support/LogCapture.hpp"
 #include "support/cancelAt.hpp"
 #include "support/text.hpp"
-#include "vclink/util/exception/CancelledOperationException.hpp"
 
 namespace
 {
@@ -20,14 +19,9 @@ namespace
 namespace git = vclink::git;
 using testing::ElementsAre;
 using testing::IsEmpty;
-using vclink::test::cancelAt;
-using vclink::test::LogCapture;
-using vclink::test::NothingChanges;
-using vclink::test::ProgressCall;
-using vclink::test::stateOf;
-using vclink::util::exception::CancelledOperationException;
+using namespace vclink::test;
 
-class InteractorWithoutDisplay : public vclink::test::TestInteractor
+class InteractorWithoutDisplay : public TestInteractor
 {
   public:
     vclink::ProgressReporter *getProgressReporter() override
@@ -36,7 +30,7 @@ class InteractorWithoutDisplay : public vclink::test::TestInteractor
     }
 };
 
-class SwitchBranchProgress : public vclink::test::SwitchBranchFixture
+class SwitchBranchProgress : public SwitchBranchFixture
 {
 };
 
@@ -59,45 +53,36 @@ TEST_F(SwitchBranchProgress, NotesItsProgressInTheLog)
                             testing::StartsWith("Calls to chmod / mkdir / stat : ")));
 }
 
-TEST_F(SwitchBranchProgress, GoesOnWhenItsProgressCannotBeShown)
+TEST_F(SwitchBranchProgress, NeedsNoDisplayOrOneThatWorks)
 {
+    const auto expected = stateAfterGit("topic");
     interactor_->progress.onCall = [](std::size_t) { throw std::runtime_error("no display"); };
-    const auto expected = stateAfterGit("topic");
-    EXPECT_NO_THROW(switchTo("topic"));
-    expectSame(stateOf(repository_), expected);
-    EXPECT_EQ(git::pendingCallbackException(), nullptr);
-}
-
-TEST_F(SwitchBranchProgress, NeedsNoDisplay)
-{
-    const auto expected = stateAfterGit("topic");
-    git::GitAdapter adapter(vclink::test::asPath(repository_.path()),
+    git::GitAdapter without(asPath(repository_.path()),
                             std::make_shared<InteractorWithoutDisplay>());
-    git::BranchManager::create(adapter)->switchBranch("topic");
-    expectSame(stateOf(repository_), expected);
-}
-
-TEST_F(SwitchBranchProgress, CancelledBeforeItsStartMovesNothing)
-{
-    interactor_->cancel();
+    for (git::GitAdapter *const adapter : {&without, adapter_.get()})
     {
-        const NothingChanges nothing(repository_);
-        expectCancelled("topic");
+        git::BranchManager::create(*adapter)->switchBranch("topic");
+        expectSame(stateOf(repository_), expected);
+        EXPECT_EQ(git::pendingCallbackException(), nullptr);
+        repository_.git({"checkout", "--quiet", "main"});
     }
-    EXPECT_THAT(interactor_->progress.calls, IsEmpty());
-    EXPECT_NO_THROW(switchTo("topic"));
-    EXPECT_EQ(currentBranch(), "refs/heads/topic");
 }
 
-TEST_F(SwitchBranchProgress, CancelledAmongTheNotificationsMovesNothing)
+TEST_F(SwitchBranchProgress, CancelledBeforeItWritesMovesNothing)
 {
+    for (const bool isAtOnce : {true, false})
     {
         LogCapture log(git::SeverityProgress);
-        cancelAt(log, *interactor_, "Checkout Notify : ");
+        if (isAtOnce)
+            interactor_->cancel();
+        else
+            cancelAt(log, *interactor_, "Checkout Notify : ");
         const NothingChanges nothing(repository_);
         expectCancelled("topic");
+        EXPECT_THAT(interactor_->progress.calls, IsEmpty());
     }
     EXPECT_NO_THROW(switchTo("topic"));
+    EXPECT_EQ(currentBranch(), "refs/heads/topic");
     EXPECT_THAT(status(), IsEmpty());
 }
 
