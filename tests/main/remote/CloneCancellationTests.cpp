@@ -9,7 +9,6 @@
 
 #include "CloneFixture.hpp"
 #include "error/logging/severity.hpp"
-#include "support/Descriptors.hpp"
 #include "support/LogCapture.hpp"
 #include "support/cancelAt.hpp"
 
@@ -20,11 +19,9 @@ namespace git = vclink::git;
 using testing::Contains;
 using testing::Not;
 using testing::StartsWith;
-using vclink::test::cancelAt;
-using vclink::test::expectCancelled;
-using vclink::test::LogCapture;
+using namespace vclink::test;
 
-class CloneCancellation : public vclink::test::CloneFixture
+class CloneCancellation : public CloneFixture
 {
   protected:
     bool isThere() const
@@ -33,28 +30,14 @@ class CloneCancellation : public vclink::test::CloneFixture
     }
 };
 
-TEST_F(CloneCancellation, AskedForBeforeStopsTheTransfer)
+TEST_F(CloneCancellation, AskedForBeforeStopsTheTransferOrTheCheckoutWhereNothingIsTransferred)
 {
-    interactor_->cancel();
     const LogCapture log(git::SeverityProgress);
+    interactor_->cancel();
     expectCancelled([this] { generate(); });
     EXPECT_THAT(log.messages(), testing::IsEmpty());
     EXPECT_FALSE(isThere());
-}
-
-TEST_F(CloneCancellation, AskedForBeforeStopsTheCheckoutWhereNothingIsTransferred)
-{
-    interactor_->cancel();
     expectCancelled([this] { generate(server_.path(), clone_.path()); });
-    EXPECT_FALSE(isThere());
-}
-
-TEST_F(CloneCancellation, DuringTheTransferRemovesTheFolder)
-{
-    LogCapture log(git::SeverityProgress);
-    cancelAt(log, *interactor_, "Transfer Progress");
-    expectCancelled([this] { generate(); });
-    EXPECT_THAT(log.messages(), Not(Contains(StartsWith("Checkout"))));
     EXPECT_FALSE(isThere());
 }
 
@@ -64,6 +47,7 @@ TEST_F(CloneCancellation, DuringTheTransferEmptiesAFolderThatWasThere)
     LogCapture log(git::SeverityProgress);
     cancelAt(log, *interactor_, "Transfer Progress");
     expectCancelled([this] { generate(); });
+    EXPECT_THAT(log.messages(), Not(Contains(StartsWith("Checkout"))));
     ASSERT_TRUE(isThere());
     EXPECT_TRUE(std::filesystem::is_empty(clone_.path()));
 }
@@ -87,6 +71,7 @@ TEST_F(CloneCancellation, DuringTheTransferStopsTheNextCloneAtItsFirstFile)
     LogCapture log(git::SeverityProgress);
     cancelAt(log, *interactor_, "Transfer Progress");
     expectCancelled([this] { generate(); });
+    EXPECT_FALSE(isThere());
     log.onRecord(nullptr);
     log.clear();
     expectCancelled([this] { generate(); });
@@ -109,17 +94,6 @@ TEST_F(CloneCancellation, DuringTheCheckoutStopsTheTransferOfTheNextClone)
     EXPECT_THAT(log.messages(), testing::IsEmpty());
     generate();
     expectCloned(clone_);
-}
-
-TEST_F(CloneCancellation, LeavesNoDescriptorOpen)
-{
-    generate();
-    const vclink::test::NoDescriptorLeak noLeak;
-    std::filesystem::remove_all(clone_.path());
-    LogCapture log(git::SeverityProgress);
-    cancelAt(log, *interactor_, "Checkout Notify");
-    expectCancelled([this] { generate(); });
-    expectCancelled([this] { generate(); });
 }
 
 } // namespace

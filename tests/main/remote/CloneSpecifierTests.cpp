@@ -21,14 +21,11 @@ namespace
 {
 
 namespace git = vclink::git;
-using vclink::test::asUtf8;
-using vclink::test::GitRepository;
-using vclink::test::Naming;
-using vclink::test::WorkingFolder;
+using namespace vclink::test;
 
 const std::string eastern = "\xE6\x9D\xB1\xE4\xBA\xAC gr\xC3\xBC\xC3\x9F";
 
-class CloneSpecifier : public vclink::test::CloneFixture
+class CloneSpecifier : public CloneFixture
 {
   protected:
     CloneSpecifier() : CloneFixture(Naming::PlainPath)
@@ -42,9 +39,9 @@ class CloneSpecifier : public vclink::test::CloneFixture
         return GitRepository(folder() / name);
     }
     /// Nothing is made then.
-    vclink::test::Failure failureOf(const std::string &specifier) const
+    Failure failureOfClone(const std::string &specifier) const
     {
-        auto failure = vclink::test::failureOf([&] { generate(specifier, clone_.path()); });
+        auto failure = failureOf([&] { generate(specifier, clone_.path()); });
         EXPECT_FALSE(std::filesystem::exists(clone_.path())) << specifier;
         return failure;
     }
@@ -66,7 +63,7 @@ class CloneTarget : public CloneSpecifier
 TEST_F(CloneSpecifier, GoesToLibGit2AsUtf8)
 {
     const auto server = serverNamed(eastern);
-    const vclink::test::LogCapture log(git::SeverityParameter);
+    const LogCapture log(git::SeverityParameter);
     generate(server.path(), folder() / ("clone " + eastern));
     const GitRepository clone(folder() / ("clone " + eastern));
     expectCloned(clone);
@@ -85,7 +82,8 @@ TEST_F(CloneSpecifier, MayHaveBlanksAndEscapesInAUrl)
 TEST_F(CloneSpecifier, MayBeRelativeToTheWorkingFolder)
 {
     const WorkingFolder here(folder().path());
-    for (const std::string name : {"server", "./server", "author/../server", "author"})
+    for (const std::string name :
+         {"server", "./server", "author/../server", "author", author_.path().c_str()})
     {
         generate(name, "relative/clone");
         expectCloned(GitRepository(folder() / "relative/clone"));
@@ -93,50 +91,20 @@ TEST_F(CloneSpecifier, MayBeRelativeToTheWorkingFolder)
     }
 }
 
-TEST_F(CloneSpecifier, MayNameTheFolderOfAWorkingCopy)
-{
-    generate(author_.path(), clone_.path());
-    expectCloned(clone_);
-}
-
-TEST_F(CloneSpecifier, OfAFolderThatIsNoRepositoryFails)
+TEST_F(CloneSpecifier, OfNoRepositoryFailsAndLeavesTheGeneratorAsItWas)
 {
     std::filesystem::create_directory(folder() / "plain");
-    EXPECT_EQ(failureOf(folder() / "plain").code, GIT_ENOTFOUND);
-    EXPECT_LT(failureOf("file://" + (folder() / "plain").string()).code, 0);
-}
-
-TEST_F(CloneSpecifier, OfAFolderThatIsMissingFails)
-{
-    EXPECT_LT(failureOf(folder() / "missing").code, 0);
-    EXPECT_LT(failureOf("file://" + (folder() / "missing").string()).code, 0);
-}
-
-TEST_F(CloneSpecifier, ThatIsEmptyFails)
-{
-    const auto failure = failureOf("");
-    EXPECT_LT(failure.code, 0);
-    EXPECT_NE(failure.text, "");
-}
-
-TEST_F(CloneSpecifier, OfAnUnknownSchemeFails)
-{
-    EXPECT_THAT(
-        failureOf("nonsense://host/path").text,
-        testing::HasSubstr(vclink::test::libgit2Release::refusalOfScheme("nonsense://host/path")));
-}
-
-TEST_F(CloneSpecifier, ThatFailsLeavesTheGeneratorAsItWas)
-{
-    failureOf(folder() / "missing");
-    failureOf("");
-    generate();
-    expectCloned(clone_);
-}
-
-TEST_F(CloneTarget, MayBeAnEmptyFolder)
-{
-    std::filesystem::create_directory(clone_.path());
+    const std::string url = "file://" + folder().path().string();
+    EXPECT_EQ(failureOfClone(folder() / "plain").code, GIT_ENOTFOUND);
+    for (const std::string &specifier :
+         {url + "/plain", (folder() / "missing").string(), url + "/missing", std::string()})
+    {
+        const auto failure = failureOfClone(specifier);
+        EXPECT_LT(failure.code, 0) << specifier;
+        EXPECT_NE(failure.text, "") << specifier;
+    }
+    EXPECT_THAT(failureOfClone("nonsense://host/path").text,
+                testing::HasSubstr(libgit2Release::refusalOfScheme("nonsense://host/path")));
     generate();
     expectCloned(clone_);
 }
@@ -147,39 +115,27 @@ TEST_F(CloneTarget, MayLieInFoldersThatAreMissing)
     expectCloned(GitRepository(folder() / "a/b/c"));
 }
 
-TEST_F(CloneTarget, IsAFailureWhenItIsNotEmpty)
+TEST_F(CloneTarget, IsAFailureWhenItIsNotEmptyOrAFileOrHasNoName)
 {
-    std::filesystem::create_directory(clone_.path());
     clone_.write("mine", "x");
-    const auto failure = vclink::test::failureOf([this] { generate(); });
-    EXPECT_EQ(failure.code, GIT_EEXISTS);
-    EXPECT_EQ(failure.errorClass, GIT_ERROR_INVALID);
-    EXPECT_EQ(failure.text,
-              "'" + clone_.path().string() + "' exists and is not an empty directory");
+    const auto failure = failureOf([this] { generate(); });
+    EXPECT_EQ(failure,
+              (Failure{GIT_EEXISTS, GIT_ERROR_INVALID,
+                       "'" + clone_.path().string() + "' exists and is not an empty directory"}));
     EXPECT_THAT(names(), testing::ElementsAre("mine"));
+    EXPECT_EQ(failureOf([&] { generate(nameOf(server_), clone_ / "mine"); }).code, GIT_EEXISTS);
     EXPECT_EQ(clone_.read("mine"), "x");
-}
-
-TEST_F(CloneTarget, IsAFailureWhenItIsAFile)
-{
-    GitRepository(folder().path()).write("clone", "x");
-    EXPECT_EQ(vclink::test::failureOf([this] { generate(); }).code, GIT_EEXISTS);
-    EXPECT_EQ(GitRepository(folder().path()).read("clone"), "x");
+    EXPECT_LT(failureOf([this] { generate(nameOf(server_), ""); }).code, 0);
 }
 
 TEST_F(CloneTarget, ThatWasThereAndEmptyStaysSoAfterAFailure)
 {
     std::filesystem::create_directory(clone_.path());
-    vclink::test::failureOf([this] { generate(folder() / "missing", clone_.path()); });
+    failureOf([this] { generate(folder() / "missing", clone_.path()); });
     ASSERT_TRUE(std::filesystem::is_directory(clone_.path()));
     EXPECT_THAT(names(), testing::IsEmpty());
     generate();
     expectCloned(clone_);
-}
-
-TEST_F(CloneTarget, WithAnEmptyNameFails)
-{
-    EXPECT_LT(vclink::test::failureOf([this] { generate(nameOf(server_), ""); }).code, 0);
 }
 
 TEST_F(CloneTarget, ThatMayNotBeWrittenFails)
@@ -188,14 +144,14 @@ TEST_F(CloneTarget, ThatMayNotBeWrittenFails)
     std::filesystem::permissions(folder() / "closed", std::filesystem::perms(0555));
     for (const auto &entered : {environment().home(), server_.path()})
         std::filesystem::permissions(entered, std::filesystem::perms(0755));
-    const std::string outcome = vclink::test::runAsUnprivilegedUser(
+    const std::string outcome = runAsUnprivilegedUser(
         [this]() -> std::string
         {
             try
             {
                 const auto fresh = git::GitAdapterFactory().createWorkingCopyGenerator(interactor_);
-                fresh->generate(vclink::test::asUtf16("file://" + server_.path().string()),
-                                vclink::test::asPath((folder() / "closed/clone").string()));
+                fresh->generate(asUtf16("file://" + server_.path().string()),
+                                asPath((folder() / "closed/clone").string()));
                 return "cloned";
             }
             catch (const git::LibGit2Exception &exception)

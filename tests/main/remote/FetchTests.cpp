@@ -8,7 +8,6 @@
 
 #include "RemoteFixture.hpp"
 #include "error/logging/severity.hpp"
-#include "support/Descriptors.hpp"
 #include "support/LogCapture.hpp"
 
 namespace
@@ -20,12 +19,9 @@ using testing::ElementsAre;
 using testing::HasSubstr;
 using testing::IsEmpty;
 using testing::StartsWith;
-using vclink::test::failureOf;
-using vclink::test::LogCapture;
-using vclink::test::Naming;
-using vclink::test::stateOf;
+using namespace vclink::test;
 
-class Fetch : public vclink::test::RemoteFixture, public testing::WithParamInterface<Naming>
+class Fetch : public RemoteFixture, public testing::WithParamInterface<Naming>
 {
   protected:
     Fetch() : RemoteFixture(GetParam())
@@ -50,7 +46,7 @@ class Fetch : public vclink::test::RemoteFixture, public testing::WithParamInter
     }
     std::vector<std::string> remoteBranches() const
     {
-        return vclink::test::splitLines(
+        return splitLines(
             repository_.git({"for-each-ref", "--format=%(refname:lstrip=3)", "refs/remotes"}));
     }
 };
@@ -65,42 +61,34 @@ TEST_P(Fetch, TakesANewBranch)
     EXPECT_THAT(remoteBranches(), ElementsAre("feature/gr\xC3\xBC\xC3\x9F", "main"));
 }
 
-TEST_P(Fetch, MovesABranch)
+TEST_P(Fetch, MovesABranchAlsoWhereItWasRewritten)
 {
     fetch();
-    const std::string id = publish("file", "changed\n");
+    std::string id = publish("file", "changed\n");
     expectAsGitDoes();
     EXPECT_EQ(idOf("origin/main"), id);
-}
-
-TEST_P(Fetch, MovesABranchThatWasRewritten)
-{
-    fetch();
     author_.git({"checkout", "--quiet", "--orphan", "other"});
     author_.git({"branch", "-D", "--quiet", "main"});
     author_.git({"checkout", "--quiet", "--orphan", "main"});
-    const std::string id = publish("file", "from the beginning\n");
+    id = publish("file", "from the beginning\n");
     expectAsGitDoes();
     EXPECT_EQ(idOf("origin/main"), id);
+    const auto before = stateOf(repository_);
+    fetch();
+    EXPECT_EQ(stateOf(repository_), before) << "there is nothing new";
 }
 
-TEST_P(Fetch, KeepsABranchThatIsDeletedThere)
+TEST_P(Fetch, KeepsBranchesThatAreDeletedThereUnlessPruningIsConfigured)
 {
     author_.git({"push", "--quiet", "server", "main:gone"});
     fetch();
-    server_.git({"update-ref", "-d", "refs/heads/gone"});
+    for (const auto *name : {"gone", "main"})
+        server_.git({"update-ref", "-d", std::string("refs/heads/") + name});
     expectAsGitDoes();
     EXPECT_THAT(remoteBranches(), ElementsAre("gone", "main"));
-}
-
-TEST_P(Fetch, DropsABranchThatIsDeletedThereWherePruningIsConfigured)
-{
-    author_.git({"push", "--quiet", "server", "main:gone"});
-    fetch();
-    server_.git({"update-ref", "-d", "refs/heads/gone"});
     repository_.git({"config", "remote.origin.prune", "true"});
     expectAsGitDoes();
-    EXPECT_THAT(remoteBranches(), ElementsAre("main"));
+    EXPECT_THAT(references(repository_), IsEmpty());
 }
 
 TEST_P(Fetch, TakesTagsOfWhatItTakes)
@@ -146,16 +134,8 @@ TEST_P(Fetch, OfAnEmptyListTakesWhatIsConfigured)
 
 TEST_P(Fetch, RefusesARefspecThatIsNone)
 {
-    const vclink::test::NothingChanges nothing(repository_);
+    const NothingChanges nothing(repository_);
     EXPECT_LT(failureOf([this] { fetch({"refs/heads/*:refs/own/main"}); }).code, 0);
-}
-
-TEST_P(Fetch, OfNothingNewChangesNothing)
-{
-    fetch();
-    const auto before = stateOf(repository_);
-    fetch();
-    EXPECT_EQ(stateOf(repository_), before);
 }
 
 TEST_P(Fetch, LeavesBranchesAndFilesAsTheyAre)
@@ -171,42 +151,20 @@ TEST_P(Fetch, LeavesBranchesAndFilesAsTheyAre)
     EXPECT_EQ(after, before);
 }
 
-TEST_P(Fetch, OfAnEmptyRemoteTakesNothing)
-{
-    server_.git({"update-ref", "-d", "refs/heads/main"});
-    fetch();
-    EXPECT_THAT(references(repository_), IsEmpty());
-}
-
-TEST_P(Fetch, TellsEachReferenceThatItMoves)
+/// The reflog of the reference holds libgit2's own words.
+TEST_P(Fetch, TellsItsTransferAndEachReferenceThatItMoves)
 {
     author_.git({"push", "--quiet", "server", "main:other"});
-    const LogCapture log(git::SeverityParameter);
+    const LogCapture log(git::SeverityParameter | git::SeverityProgress | git::SeverityDiagnostic |
+                         git::SeverityException);
     fetch();
-    const auto messages = log.messages();
-    EXPECT_THAT(messages, Contains(" ref=refs/remotes/origin/main"));
-    EXPECT_THAT(messages, Contains(" ref=refs/remotes/origin/other"));
-}
-
-TEST_P(Fetch, TellsItsTransfer)
-{
-    const LogCapture log(git::SeverityProgress);
-    fetch();
-    EXPECT_THAT(log.messages(), Contains(StartsWith("Transfer Progress (Objects / Bytes): 3")));
+    for (const auto *name : {" ref=refs/remotes/origin/main", " ref=refs/remotes/origin/other"})
+        EXPECT_THAT(log.messages(git::SeverityParameter), Contains(name));
+    EXPECT_THAT(log.messages(git::SeverityProgress),
+                Contains(StartsWith("Transfer Progress (Objects / Bytes): 3")));
+    EXPECT_THAT(log.messages(git::SeverityDiagnostic), IsEmpty());
+    EXPECT_THAT(log.messages(git::SeverityException), IsEmpty());
     EXPECT_TRUE(interactor_->progress.calls.empty());
-}
-
-TEST_P(Fetch, LogsNoFailureOfItsOwn)
-{
-    const LogCapture log(git::SeverityDiagnostic | git::SeverityException);
-    fetch();
-    EXPECT_THAT(log.messages(), IsEmpty());
-}
-
-/// The reflog of the reference holds libgit2's own words.
-TEST_P(Fetch, LeavesTheReflogToLibGit2)
-{
-    fetch();
     EXPECT_THAT(repository_.git({"reflog", "show", "refs/remotes/origin/main"}),
                 HasSubstr("fetch"));
 }
@@ -221,20 +179,6 @@ TEST_P(Fetch, ThatFailsLeavesTheRepositoryAsItWas)
     EXPECT_EQ(stateOf(repository_), before);
     repository_.remove(".git/refs/remotes/origin/main.lock");
     expectAsGitDoes();
-}
-
-TEST_P(Fetch, LeavesNoDescriptorOpen)
-{
-    fetch();
-    const vclink::test::NoDescriptorLeak noLeak;
-    publish("file", "changed\n");
-    fetch();
-    interactor_->cancel();
-    publish("file", "changed again\n");
-    if (GetParam() == Naming::FileUrl)
-        vclink::test::expectCancelled([this] { fetch(); });
-    repository_.git({"remote", "set-url", "origin", (folder() / "nowhere").string()});
-    failureOf([this] { fetch(); });
 }
 
 INSTANTIATE_TEST_SUITE_P(Locally, Fetch, testing::Values(Naming::PlainPath, Naming::FileUrl));

@@ -4,6 +4,7 @@
 #include <algorithm>
 #include <iterator>
 #include <memory>
+#include <optional>
 #include <sstream>
 #include <string>
 #include <type_traits>
@@ -17,7 +18,6 @@
 #include "RemoteFixture.hpp"
 #include "error/logging/severity.hpp"
 #include "main/OtherAdapter.hpp"
-#include "support/Descriptors.hpp"
 #include "support/LogCapture.hpp"
 
 namespace
@@ -26,17 +26,13 @@ namespace
 namespace git = vclink::git;
 using testing::ElementsAre;
 using testing::IsEmpty;
-using vclink::test::Failure;
-using vclink::test::failureOf;
-using vclink::test::LogCapture;
-using vclink::test::Naming;
-using vclink::test::NothingChanges;
+using namespace vclink::test;
 
 static_assert(std::is_abstract_v<git::GitRemote> && std::has_virtual_destructor_v<git::GitRemote>);
 static_assert(std::is_same_v<decltype(git::GitRemoteHead::local), std::int32_t>);
 static_assert(sizeof(git::GitRemoteHead::oid) == 20 && sizeof(git::GitRemoteHead::loid) == 20);
 
-class GitRemoteTest : public vclink::test::RemoteFixture
+class GitRemoteTest : public RemoteFixture
 {
 };
 
@@ -53,7 +49,7 @@ std::string describe(const git::GitRemoteHead &head)
     return hexadecimal(head.oid) + '\t' + head.name;
 }
 
-class RemoteHeads : public vclink::test::RemoteFixture, public testing::WithParamInterface<Naming>
+class RemoteHeads : public RemoteFixture, public testing::WithParamInterface<Naming>
 {
   protected:
     RemoteHeads() : RemoteFixture(GetParam())
@@ -69,7 +65,7 @@ class RemoteHeads : public vclink::test::RemoteFixture, public testing::WithPara
     }
     std::vector<std::string> headsOfGit() const
     {
-        return vclink::test::splitLines(repository_.git({"ls-remote", "origin"}));
+        return splitLines(repository_.git({"ls-remote", "origin"}));
     }
     /// The symbolic target of each head that has one, behind its name.
     std::vector<std::string> symbolicHeads() const
@@ -82,20 +78,16 @@ class RemoteHeads : public vclink::test::RemoteFixture, public testing::WithPara
     }
 };
 
-TEST_F(GitRemoteTest, TakesNoAdapterOfAnotherBackEnd)
-{
-    vclink::test::OtherAdapter other;
-    EXPECT_THROW(static_cast<void>(git::GitRemote::create("origin", other)), std::bad_cast);
-}
-
-TEST_F(GitRemoteTest, SharesTheFactoryOfItsAdapter)
+TEST_F(GitRemoteTest, SharesTheFactoryOfItsAdapterAndTakesNoneOfAnotherBackEnd)
 {
     const auto factory = adapter_->getOptionsFactory();
     const long before = factory.use_count();
-    auto other = git::GitRemote::create("origin", *adapter_);
+    auto remote = git::GitRemote::create("origin", *adapter_);
     EXPECT_EQ(factory.use_count(), before + 1);
-    other.reset();
+    remote.reset();
     EXPECT_EQ(factory.use_count(), before);
+    OtherAdapter other;
+    EXPECT_THROW(static_cast<void>(git::GitRemote::create("origin", other)), std::bad_cast);
 }
 
 TEST_F(GitRemoteTest, IsMadeWithoutALookAtTheRepository)
@@ -147,29 +139,22 @@ TEST_F(GitRemoteTest, IsLookedUpAnewAtEachOperation)
     EXPECT_NE(failureOf([&] { later->getRemoteHeads(); }).code, 0);
 }
 
-TEST_F(GitRemoteTest, ThatCannotBeReachedFailsAndChangesNothing)
+TEST_F(GitRemoteTest, ThatCannotBeReachedFailsChangesNothingAndWorksLater)
 {
     repository_.git({"remote", "set-url", "origin", (folder() / "nowhere").string()});
-    const NothingChanges nothing(repository_);
-    const vclink::test::NoDescriptorLeak noLeak;
+    std::optional<NothingChanges> nothing(std::in_place, repository_);
     for (const auto &failure : {failureOf([&] { fetch(); }), failureOf([&] { push({"main"}); }),
                                 failureOf([&] { remote().getRemoteHeads(); })})
     {
         EXPECT_LT(failure.code, 0);
         EXPECT_NE(failure.text, "");
     }
-}
-
-TEST_F(GitRemoteTest, WorksAfterAFailure)
-{
-    repository_.git({"remote", "set-url", "origin", (folder() / "nowhere").string()});
-    failureOf([&] { fetch(); });
+    nothing.reset();
     repository_.git({"remote", "set-url", "origin", nameOf(server_)});
     EXPECT_NO_THROW(fetch());
-    EXPECT_EQ(idOf("origin/main"), idOf("refs/remotes/origin/main"));
 }
 
-TEST_P(RemoteHeads, AreThoseOfGit)
+TEST_P(RemoteHeads, AreThoseOfGitAndTellNothingOfTheObjectsHere)
 {
     publish("folder/second", "x");
     author_.git({"tag", "light"});
@@ -178,9 +163,15 @@ TEST_P(RemoteHeads, AreThoseOfGit)
     author_.git({"branch", "feature/gr\xC3\xBC\xC3\x9F"});
     author_.git({"push", "--quiet", "server", "--all"});
     author_.git({"push", "--quiet", "server", "--tags"});
-    const auto found = heads();
-    EXPECT_EQ(found, headsOfGit());
-    EXPECT_EQ(found.size(), 6U);
+    fetch();
+    const NothingChanges nothing(repository_);
+    EXPECT_EQ(heads(), headsOfGit());
+    EXPECT_EQ(heads().size(), 6U);
+    for (const auto &head : remote().getRemoteHeads())
+    {
+        EXPECT_EQ(head.local, 0) << head.name;
+        EXPECT_EQ(head.loid, git::GitRemoteHead::Id()) << head.name;
+    }
 }
 
 TEST_P(RemoteHeads, OfAnEmptyRemoteAreNone)
@@ -190,33 +181,13 @@ TEST_P(RemoteHeads, OfAnEmptyRemoteAreNone)
     EXPECT_EQ(remote().getRemoteHeads().capacity(), 0U);
 }
 
-TEST_P(RemoteHeads, NameTheBranchThatTheHeadStandsFor)
+TEST_P(RemoteHeads, NameTheBranchThatTheHeadStandsForUnlessItIsDetached)
 {
     EXPECT_THAT(symbolicHeads(), ElementsAre("HEAD refs/heads/main"));
-}
-
-TEST_P(RemoteHeads, OfADetachedHeadNameNoBranch)
-{
     server_.git({"update-ref", "--no-deref", "HEAD", idOf("HEAD", author_)});
     server_.write("HEAD", idOf("HEAD", author_) + '\n');
     EXPECT_THAT(symbolicHeads(), IsEmpty());
     EXPECT_EQ(heads(), headsOfGit());
-}
-
-TEST_P(RemoteHeads, TellNothingOfTheObjectsHere)
-{
-    fetch();
-    for (const auto &head : remote().getRemoteHeads())
-    {
-        EXPECT_EQ(head.local, 0) << head.name;
-        EXPECT_EQ(head.loid, git::GitRemoteHead::Id()) << head.name;
-    }
-}
-
-TEST_P(RemoteHeads, ChangeNothing)
-{
-    const NothingChanges nothing(repository_);
-    heads();
 }
 
 /// Also of a success: the code 0 with an empty text.
@@ -227,14 +198,6 @@ TEST_P(RemoteHeads, LeaveOneRecordOfAFailureThatIsNone)
     EXPECT_THAT(log.messages(), ElementsAre("Throwing error  (0)"));
     heads();
     EXPECT_EQ(log.messages().size(), 2U);
-}
-
-TEST_P(RemoteHeads, LeaveNoDescriptorOpen)
-{
-    heads();
-    const vclink::test::NoDescriptorLeak noLeak;
-    for (int round = 0; round < 5; ++round)
-        heads();
 }
 
 TEST_P(RemoteHeads, AreManyInOrder)

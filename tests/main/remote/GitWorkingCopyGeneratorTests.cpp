@@ -16,7 +16,6 @@
 #include "error/VirtualTable.hpp"
 #include "error/logging/severity.hpp"
 #include "main/TestOptionsFactory.hpp"
-#include "support/Descriptors.hpp"
 #include "support/LibGit2Session.hpp"
 #include "support/LogCapture.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
@@ -25,18 +24,8 @@ namespace
 {
 
 namespace git = vclink::git;
-using testing::Contains;
-using testing::ElementsAre;
 using testing::IsEmpty;
-using testing::StartsWith;
-using vclink::test::asPath;
-using vclink::test::asUtf16;
-using vclink::test::countLibGit2Starts;
-using vclink::test::failureOf;
-using vclink::test::GitRepository;
-using vclink::test::LogCapture;
-using vclink::test::Naming;
-using vclink::test::TestOptionsFactory;
+using namespace vclink::test;
 
 using Generator = git::GitWorkingCopyGenerator;
 static_assert(std::is_base_of_v<vclink::WorkingCopyGenerator, Generator>);
@@ -47,12 +36,12 @@ static_assert(!std::is_copy_constructible_v<Generator> && !std::is_copy_assignab
 const std::string generateSignature =
     "virtual void vclink::git::GitWorkingCopyGenerator::generate(const ustring&, const upath&)";
 
-class GeneratorObject : public vclink::test::CloneFixture
+class GeneratorObject : public CloneFixture
 {
 };
 
 /// Clones of a repository on this machine, named either way.
-class Clone : public vclink::test::CloneFixture, public testing::WithParamInterface<Naming>
+class Clone : public CloneFixture, public testing::WithParamInterface<Naming>
 {
   protected:
     Clone() : CloneFixture(GetParam())
@@ -62,17 +51,13 @@ class Clone : public vclink::test::CloneFixture, public testing::WithParamInterf
 
 TEST_F(GeneratorObject, HasItsOperationBehindTheDestructor)
 {
-    EXPECT_EQ(vclink::test::slotOf(&Generator::generate), 2U);
-}
-
-TEST_F(GeneratorObject, IsWhatTheFactoryMakes)
-{
-    EXPECT_NE(dynamic_cast<Generator *>(&generator()), nullptr);
+    EXPECT_EQ(slotOf(&Generator::generate), 2U);
+    EXPECT_NE(dynamic_cast<Generator *>(&generator()), nullptr) << "of the factory";
 }
 
 TEST_F(GeneratorObject, TakesSharesOfTheInteractorAndReleasesThem)
 {
-    auto interactor = std::make_shared<vclink::test::TestInteractor>();
+    auto interactor = std::make_shared<TestInteractor>();
     const std::weak_ptr<vclink::ApplicationInteractor> watched = interactor;
     auto made = git::GitAdapterFactory().createWorkingCopyGenerator(std::move(interactor));
     // The options factory and the callbacks.
@@ -86,7 +71,7 @@ TEST_F(GeneratorObject, StartsLibGit2FirstAndStopsItLast)
     const int before = countLibGit2Starts();
     int startsAtTheFactorysEnd = 0;
     long sharesAtTheFactorysEnd = 0;
-    auto interactor = std::make_shared<vclink::test::TestInteractor>();
+    auto interactor = std::make_shared<TestInteractor>();
     auto factory = std::make_unique<TestOptionsFactory>(interactor);
     factory->onDestruction = [&]
     {
@@ -105,25 +90,20 @@ TEST_F(GeneratorObject, StartsLibGit2FirstAndStopsItLast)
 
 TEST_F(GeneratorObject, AsksItsFactoryForTheOptionsOfEachClone)
 {
-    auto factory = std::make_unique<TestOptionsFactory>(interactor_);
-    factory->cloneOptions.checkoutBranch = "gr\xC3\xBC\xC3\x9F";
-    int asked = 0;
-    factory->onCloneOptions = [&asked] { ++asked; };
     author_.git({"push", "--quiet", "server", "main:gr\xC3\xBC\xC3\x9F"});
+    auto factory = std::make_unique<TestOptionsFactory>(interactor_);
+    git::CloneOptions &options = factory->cloneOptions;
+    options.checkoutBranch = "gr\xC3\xBC\xC3\x9F";
+    int asked = 0;
+    factory->onCloneOptions = [&] { options.bare = ++asked == 2; };
     Generator made(std::unique_ptr<git::GitOptionsFactory>(std::move(factory)));
     made.generate(asUtf16(nameOf(server_)), asPath(clone_.path()));
     EXPECT_EQ(clone_.line({"symbolic-ref", "HEAD"}), "refs/heads/gr\xC3\xBC\xC3\x9F");
+    EXPECT_EQ(clone_.line({"rev-parse", "--is-bare-repository"}), "false");
     made.generate(asUtf16(nameOf(server_)), asPath(folder() / "second"));
     EXPECT_EQ(asked, 2);
-}
-
-TEST_F(GeneratorObject, MakesABareCloneWhereItsFactoryWantsOne)
-{
-    auto factory = std::make_unique<TestOptionsFactory>(interactor_);
-    factory->cloneOptions.bare = true;
-    Generator made(std::unique_ptr<git::GitOptionsFactory>(std::move(factory)));
-    made.generate(asUtf16(nameOf(server_)), asPath(clone_.path()));
-    EXPECT_EQ(clone_.line({"rev-parse", "--is-bare-repository"}), "true");
+    EXPECT_EQ(GitRepository(folder() / "second").line({"rev-parse", "--is-bare-repository"}),
+              "true");
 }
 
 TEST_F(GeneratorObject, RaisesWhatItsFactoryRaisesAndMakesNothing)
@@ -172,26 +152,25 @@ TEST_P(Clone, OfAnEmptyRepositoryIsEmpty)
     EXPECT_EQ(clone_.line({"config", "remote.origin.url"}), nameOf(server_));
 }
 
-TEST_P(Clone, ShowsTheProgressOfItsCheckout)
+TEST_P(Clone, ShowsTheProgressOfItsCheckoutAndIsNotDisturbedByADisplayThatRaises)
 {
+    auto &progress = interactor_->progress;
     generate();
-    const auto &progress = interactor_->progress;
     ASSERT_FALSE(progress.fractions.empty());
     EXPECT_EQ(progress.fractions.back(), 1.0);
     EXPECT_EQ(progress.messages.size(), 5U);
-}
-
-TEST_P(Clone, IsNotDisturbedByADisplayThatRaises)
-{
-    interactor_->progress.onCall = [](std::size_t) { throw std::runtime_error("no display"); };
-    generate();
-    expectCloned(clone_);
+    progress.onCall = [](std::size_t) { throw std::runtime_error("no display"); };
+    generate(nameOf(server_), folder() / "second");
+    expectCloned(GitRepository(folder() / "second"));
 }
 
 TEST_P(Clone, IsTracedWithItsParameters)
 {
-    const LogCapture log(git::SeverityScopeEntry | git::SeverityParameter | git::SeverityScopeExit);
+    const LogCapture log(git::SeverityScopeEntry | git::SeverityParameter | git::SeverityScopeExit |
+                         git::SeverityDiagnostic | git::SeverityException);
     generate();
+    EXPECT_THAT(log.messages(git::SeverityDiagnostic), IsEmpty());
+    EXPECT_THAT(log.messages(git::SeverityException), IsEmpty());
     const auto records = log.records();
     ASSERT_GE(records.size(), 3U);
     EXPECT_EQ(records[0].message, generateSignature);
@@ -210,24 +189,6 @@ TEST_P(Clone, IsTracedWithItsFailure)
                  git::LibGit2Exception);
     EXPECT_EQ(log.messages().front(), generateSignature);
     EXPECT_EQ(log.messages().back(), generateSignature + " [throw]");
-}
-
-TEST_P(Clone, WritesNoParametersWhenTheirSeverityIsOff)
-{
-    const LogCapture log(git::SeverityDiagnostic | git::SeverityException);
-    generate();
-    EXPECT_THAT(log.messages(), IsEmpty());
-}
-
-TEST_P(Clone, LeavesNoDescriptorOpen)
-{
-    generate();
-    const vclink::test::NoDescriptorLeak noLeak;
-    generate(nameOf(server_), folder() / "second");
-    failureOf([this] { generate(nameOf(server_), clone_.path()); });
-    failureOf([this] { generate("/nowhere", folder() / "third"); });
-    interactor_->cancel();
-    vclink::test::expectCancelled([this] { generate(nameOf(server_), folder() / "third"); });
 }
 
 INSTANTIATE_TEST_SUITE_P(Locally, Clone, testing::Values(Naming::PlainPath, Naming::FileUrl));

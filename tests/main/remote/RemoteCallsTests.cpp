@@ -25,13 +25,8 @@ namespace
 namespace git = vclink::git;
 using testing::ElementsAre;
 using testing::IsEmpty;
-using vclink::test::asPath;
-using vclink::test::asUtf16;
-using vclink::test::Failure;
-using vclink::test::failureOf;
+using namespace vclink::test;
 using Names = std::vector<std::string>;
-
-const Failure injectedFailure{-31, GIT_ERROR_OS, "injected"};
 
 const Names ofFetch{"git_repository_open_ext",   "git_remote_lookup",
                     "git_fetch_options_init",    "git_proxy_options_init",
@@ -55,7 +50,7 @@ bool isSigpipeBlocked()
     return sigismember(&mask, SIGPIPE) == 1;
 }
 
-class RemoteCalls : public vclink::test::RemoteFixture
+class RemoteCalls : public RemoteFixture
 {
   protected:
     struct Operation
@@ -80,7 +75,7 @@ class RemoteCalls : public vclink::test::RemoteFixture
     const std::string mainId_ = commit("own", "x");
     vclink::git::GitWorkingCopyGenerator generator_{
         std::static_pointer_cast<vclink::ApplicationInteractor>(interactor_)};
-    vclink::test::LibGit2Recorder calls_;
+    LibGit2Recorder calls_;
 
   private:
     int clones_ = 0;
@@ -192,9 +187,9 @@ TEST_F(RemoteCalls, OfACloneAreGivenTheTextsAndASafeRecord)
 /// The error is read before the release, which may replace libgit2's record of it.
 TEST_F(RemoteCalls, OfACloneComeAfterItsRecordItsTextsAndItsOptions)
 {
-    const vclink::test::LogCapture log(git::SeverityParameter);
+    const LogCapture log(git::SeverityParameter);
     Names toldAtTheOptions;
-    auto factory = std::make_unique<vclink::test::TestOptionsFactory>(interactor_);
+    auto factory = std::make_unique<TestOptionsFactory>(interactor_);
     factory->onCloneOptions = [&]
     {
         toldAtTheOptions = log.messages();
@@ -274,47 +269,14 @@ TEST_F(RemoteCalls, OfAListingAreCopiedWhole)
     EXPECT_EQ(heads[1].symrefTarget, "");
 }
 
-TEST_F(RemoteCalls, OfAListingThatFailsTellTheFailure)
-{
-    calls_.fail({{"git_remote_ls", -31}});
-    const vclink::test::LogCapture log(git::SeverityDiagnostic);
-    EXPECT_EQ(failureOf([this] { remote().getRemoteHeads(); }), injectedFailure);
-    EXPECT_THAT(log.messages(), ElementsAre("Throwing error injected (-31)"));
-}
-
 TEST_F(RemoteCalls, AskTheFactoryOfTheAdapterAfterTheLookup)
 {
-    class Factory : public vclink::test::TestOptionsFactory
-    {
-      public:
-        Factory(std::shared_ptr<vclink::ApplicationInteractor> interactor,
-                vclink::test::LibGit2Recorder &calls)
-            : TestOptionsFactory(std::move(interactor)), calls_(calls)
-        {
-        }
-        git::FetchOptions makeFetchOptions() override
-        {
-            calls_.note("makeFetchOptions");
-            return {};
-        }
-        git::PushOptions makePushOptions() override
-        {
-            calls_.note("makePushOptions");
-            git::PushOptions options;
-            options.packbuilderParallelism = 3;
-            return options;
-        }
-        git::ProxyOptions makeProxyOptions() override
-        {
-            calls_.note("makeProxyOptions");
-            return {};
-        }
-
-      private:
-        vclink::test::LibGit2Recorder &calls_;
-    };
-    git::GitAdapter adapter(asPath(repository_.path()),
-                            std::make_shared<Factory>(interactor_, calls_));
+    const auto factory = std::make_shared<TestOptionsFactory>(interactor_);
+    factory->onFetchOptions = [this] { calls_.note("makeFetchOptions"); };
+    factory->onPushOptions = [this] { calls_.note("makePushOptions"); };
+    factory->onProxyOptions = [this] { calls_.note("makeProxyOptions"); };
+    factory->pushOptions.packbuilderParallelism = 3;
+    git::GitAdapter adapter(asPath(repository_.path()), factory);
     const auto remote = git::GitRemote::create("origin", adapter);
     calls_.on<git_remote_push>(
         [](git_remote *, const git_strarray *, const git_push_options *options)

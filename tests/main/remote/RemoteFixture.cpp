@@ -9,6 +9,7 @@
 #include <gtest/gtest.h>
 
 #include "error/errorUtil/callbackException.hpp"
+#include "support/Descriptors.hpp"
 #include "support/text.hpp"
 #include "vclink/util/exception/CancelledOperationException.hpp"
 
@@ -28,6 +29,7 @@ std::vector<ustring> asTexts(const std::vector<std::string> &texts)
 
 void expectCancelled(const std::function<void()> &action)
 {
+    const NoDescriptorLeak noLeak;
     try
     {
         action();

@@ -19,7 +19,8 @@ enum class Naming
     FileUrl
 };
 
-/// Expects that `action` ends with the exception of a cancellation, which leaves nothing behind.
+/// Expects that `action` ends with the exception of a cancellation, which leaves no descriptor
+/// open.
 void expectCancelled(const std::function<void()> &action);
 
 /// Base of the fixtures whose tests talk to a remote: a bare repository, "server", to which a
