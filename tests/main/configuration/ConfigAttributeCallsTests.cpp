@@ -22,10 +22,9 @@ namespace
 
 namespace git = vclink::git;
 using testing::ElementsAre;
-using vclink::test::asPath;
-using vclink::test::LibGit2Recorder;
+using namespace vclink::test;
 
-class AttributeCalls : public vclink::test::BranchFixture
+class AttributeCalls : public BranchFixture
 {
   protected:
     AttributeCalls()
@@ -85,7 +84,7 @@ TEST_F(AttributeCalls, ThatGiveAnUnknownStateAreRaisedWithTheRawValue)
     EXPECT_EQ(calls.steps().back(), "git_repository_free");
 }
 
-class ConfigCalls : public vclink::test::GitConfigFixture
+class ConfigCalls : public GitConfigFixture
 {
 };
 
@@ -105,7 +104,7 @@ TEST_F(ConfigCalls, OfALifeAreTheseInOrder)
 
 TEST_F(ConfigCalls, OfAWriteAReadAndThePathAreOneEach)
 {
-    const vclink::test::InstallPath installation("/opt/host");
+    const InstallPath installation("/opt/host");
     git::GitConfig config;
     LibGit2Recorder calls;
     config.writeDiffTool();

@@ -1,9 +1,11 @@
 // SPDX-License-Identifier: MIT
+#include <array>
 #include <cstring>
 #include <memory>
 #include <string>
 #include <type_traits>
 #include <typeinfo>
+#include <vector>
 
 #include <git2.h>
 #include <gmock/gmock.h>
@@ -13,8 +15,8 @@
 #include "main/GitAttributesImpl.hpp"
 #include "main/OtherAdapter.hpp"
 #include "main/branches/BranchFixture.hpp"
-#include "support/Descriptors.hpp"
 #include "support/LogCapture.hpp"
+#include "support/Sentence.hpp"
 #include "support/text.hpp"
 #include "vclink/git/GitAttributes.hpp"
 
@@ -25,12 +27,9 @@ using testing::IsEmpty;
 using vclink::git::GitAttributes;
 using vclink::git::GitAttributesImpl;
 using vclink::git::serialize;
-using vclink::test::asPath;
-using vclink::test::asUtf16;
-using vclink::test::failureOf;
-using vclink::test::GitRepository;
+using namespace vclink::test;
 
-class GitAttributesTest : public vclink::test::BranchFixture
+class GitAttributesTest : public BranchFixture
 {
   protected:
     /// What a new object says, in the words of a line of attributes.
@@ -60,33 +59,104 @@ class GitAttributesTest : public vclink::test::BranchFixture
     }
 };
 
-TEST_F(GitAttributesTest, GivesEachState)
+/// What one file says of paths: path, attribute and the answer in the words of a line of
+/// attributes.
+struct AttributeRows : Sentence
 {
-    repository_.write(".gitattributes", "*.a text\n*.b -text\n*.c text=auto\n*.d !text\n");
-    expectAsGit("x.a", "text", "text");
-    expectAsGit("x.b", "text", "-text");
-    expectAsGit("x.c", "text", "text=auto");
-    expectAsGit("x.d", "text", "!text");
+    std::string text;
+    std::vector<std::array<std::string, 3>> answers;
+    std::string folder = "";
+};
+
+class AttributesOfAFile : public GitAttributesTest,
+                          public testing::WithParamInterface<AttributeRows>
+{
+};
+
+TEST_P(AttributesOfAFile, AreThoseOfGit)
+{
+    if (!GetParam().folder.empty())
+    {
+        repository_.write(GetParam().folder + "/.gitattributes", "*.txt x\n* y=folder\n");
+        repository_.write(GetParam().folder + "/deep/.gitattributes", "*.txt -x\n");
+    }
+    repository_.write(".gitattributes", GetParam().text);
+    for (const auto &[path, name, expected] : GetParam().answers)
+        expectAsGit(path, name, expected);
 }
 
+const AttributeRows attributeRows[]{
+    {{"InEachState"},
+     "*.a text\n*.b -text\n*.c text=auto\n*.d !text\n",
+     {{"x.a", "text", "text"},
+      {"x.b", "text", "-text"},
+      {"x.c", "text", "text=auto"},
+      {"x.d", "text", "!text"},
+      {"no/such/file.a", "text", "text"},
+      {"x.a", "merge", "!merge"},
+      {"x", "text", "!text"}}},
+    {{"InNoLine"}, "", {{"x", "text", "!text"}}},
+    {{"WithFoldersInItsPatterns"},
+     "folder/*.txt x\n/top y\n**/any z\n",
+     {{"folder/a.txt", "x", "x"},
+      {"a.txt", "x", "!x"},
+      {"top", "y", "y"},
+      {"folder/top", "y", "!y"},
+      {"folder/deep/any", "z", "z"}}},
+    {{"WithSeveralLinesThatMatch"},
+     "* x=one\n*.txt x=two\na.* x=three\n*.txt y\n",
+     {{"a.txt", "x", "x=three"}, {"b.txt", "x", "x=two"}}},
+    {{"WithMacrosThatALaterLineMayTakeBack"},
+     "[attr]mine x=1 -y z\n*.m mine\n*.bin binary\nspecial.bin merge=mine\n",
+     {{"a.m", "mine", "mine"},
+      {"a.m", "x", "x=1"},
+      {"a.m", "y", "-y"},
+      {"a.m", "z", "z"},
+      {"a.bin", "binary", "binary"},
+      {"a.bin", "text", "-text"},
+      {"a.bin", "diff", "-diff"},
+      {"a.bin", "merge", "-merge"},
+      {"special.bin", "merge", "merge=mine"},
+      {"special.bin", "diff", "-diff"}}},
+    {{"WithNamesAndValuesThatAreNoAsciiOrNoUtf8"},
+     "gr\xC3\xBC\xC3\x9F x=sch\xC3\xB6n\nfolder/\xF0\x9F\x8C\xB3 y\ncaf\xE9 x=th\xE9\n",
+     {{"gr\xC3\xBC\xC3\x9F", "x", "x=sch\xC3\xB6n"},
+      {"folder/\xF0\x9F\x8C\xB3", "y", "y"},
+      {"caf\xE9", "x", "x=th\xE9"}}},
+    {{"BehindThatOfANearerFolder"},
+     "*.txt x=root z\n",
+     {{"a.txt", "x", "x=root"},
+      {"folder/a.txt", "x", "x"},
+      {"folder/a.txt", "z", "z"},
+      {"folder/deep/a.txt", "x", "-x"},
+      {"folder/deep/deeper/a.txt", "x", "-x"},
+      {"folder/deep/a.txt", "y", "y=folder"},
+      {"a.txt", "y", "!y"}},
+     "folder"},
+};
+
+INSTANTIATE_TEST_SUITE_P(Lines, AttributesOfAFile, testing::ValuesIn(attributeRows),
+                         testing::PrintToStringParamName());
+
+/// And words that are the names of states are none.
 TEST_F(GitAttributesTest, GivesTheStatesAsTheirOwnAlternatives)
 {
-    repository_.write(".gitattributes", "*.a text\n*.b -text\n*.c text=auto\n*.d !text\n");
+    repository_.write(".gitattributes", "a x\nb -x\nc x=set\nd !x\ne x=unset\nf x=true\n"
+                                        "g x=false\nh x=unspecified\n");
+    const std::vector<std::size_t> alternatives{0, 1, 2, 3, 2, 2, 2, 2};
+    const std::vector<std::string> words{"x",       "-x",     "x=set",   "!x",
+                                         "x=unset", "x=true", "x=false", "x=unspecified"};
+    const NothingChanges nothing(repository_);
+    const LogCapture log;
     const auto attributes = GitAttributes::create(*adapter_);
-    const auto index = [&](const std::string &path)
-    { return attributes->getAttribute(asPath(path), u"text").attributeValue.index(); };
-    EXPECT_EQ(index("x.a"), 0U);
-    EXPECT_EQ(index("x.b"), 1U);
-    EXPECT_EQ(index("x.c"), 2U);
-    EXPECT_EQ(index("x.d"), 3U);
-}
-
-TEST_F(GitAttributesTest, IsUnspecifiedWhereNoFileMentionsIt)
-{
-    expectAsGit("x", "text", "!text");
-    repository_.write(".gitattributes", "*.a merge\n");
-    expectAsGit("x.a", "text", "!text");
-    expectAsGit("x.b", "merge", "!merge");
+    for (std::size_t i = 0; i < words.size(); ++i)
+    {
+        const auto attribute =
+            attributes->getAttribute(asPath(std::string(1, static_cast<char>('a' + i))), u"x");
+        EXPECT_EQ(attribute.attributeValue.index(), alternatives[i]) << words[i];
+        EXPECT_EQ(serialize(attribute), words[i]);
+    }
+    EXPECT_THAT(log.messages(), IsEmpty());
 }
 
 TEST_F(GitAttributesTest, GivesTheNameUnchanged)
@@ -97,17 +167,6 @@ TEST_F(GitAttributesTest, GivesTheNameUnchanged)
         EXPECT_EQ(attributes->getAttribute(asPath("file"), name).name, name);
 }
 
-TEST_F(GitAttributesTest, TellsWordsOfStatesFromStates)
-{
-    repository_.write(".gitattributes",
-                      "a x=set\nb x=unset\nc x=true\nd x=false\ne x=unspecified\n");
-    EXPECT_EQ(ask("a", "x"), "x=set");
-    EXPECT_EQ(ask("b", "x"), "x=unset");
-    EXPECT_EQ(ask("c", "x"), "x=true");
-    EXPECT_EQ(ask("d", "x"), "x=false");
-    EXPECT_EQ(ask("e", "x"), "x=unspecified");
-}
-
 /// libgit2 reads it as set, git as an empty value.
 TEST_F(GitAttributesTest, TakesAnEmptyValueAsSet)
 {
@@ -116,67 +175,28 @@ TEST_F(GitAttributesTest, TakesAnEmptyValueAsSet)
     EXPECT_EQ(byGit("a", "x"), "x=");
 }
 
-TEST_F(GitAttributesTest, TakesTheFileOfTheNearestFolder)
-{
-    repository_.write(".gitattributes", "*.txt x=root y\n");
-    repository_.write("folder/.gitattributes", "*.txt x=folder\n");
-    repository_.write("folder/deep/.gitattributes", "*.txt -x\n");
-    expectAsGit("a.txt", "x", "x=root");
-    expectAsGit("folder/a.txt", "x", "x=folder");
-    expectAsGit("folder/deep/a.txt", "x", "-x");
-    expectAsGit("folder/deep/a.txt", "y", "y");
-    expectAsGit("folder/deep/deeper/a.txt", "x", "-x");
-}
-
-TEST_F(GitAttributesTest, TakesPatternsWithFolders)
-{
-    repository_.write(".gitattributes", "folder/*.txt x\n/top y\n**/any z\n");
-    expectAsGit("folder/a.txt", "x", "x");
-    expectAsGit("a.txt", "x", "!x");
-    expectAsGit("top", "y", "y");
-    expectAsGit("folder/top", "y", "!y");
-    expectAsGit("folder/deep/any", "z", "z");
-}
-
-TEST_F(GitAttributesTest, TakesTheLastLineThatMatches)
-{
-    repository_.write(".gitattributes", "* x=one\n*.txt x=two\na.* x=three\n*.txt y\n");
-    expectAsGit("a.txt", "x", "x=three");
-    expectAsGit("b.txt", "x", "x=two");
-}
-
-TEST_F(GitAttributesTest, TakesTheFileOfTheRepositoryFirst)
-{
-    repository_.write(".gitattributes", "* x=tree\n");
-    repository_.write(".git/info/attributes", "* x=repository\n");
-    expectAsGit("a", "x", "x=repository");
-}
-
 TEST_F(GitAttributesTest, TakesTheFileOfTheIndexWhereNoneStands)
 {
-    repository_.write(".gitattributes", "* x=index\n");
     repository_.write("folder/.gitattributes", "* y=index\n");
     repository_.add();
-    repository_.remove(".gitattributes");
     repository_.remove("folder");
-    expectAsGit("a", "x", "x=index");
     expectAsGit("folder/a", "y", "y=index");
 }
 
-TEST_F(GitAttributesTest, TakesTheWorkingTreesFileBeforeTheIndexs)
+TEST_F(GitAttributesTest, TakesTheFilesInThisOrder)
 {
-    repository_.write(".gitattributes", "* x=index\n");
+    GitRepository(environment().home())
+        .write(".config/git/attributes", "* a=user b=user c=user d=user\n");
+    expectAsGit("x", "d", "d=user");
+    repository_.write(".gitattributes", "* a=index b=index c=index\n");
     repository_.add();
-    repository_.write(".gitattributes", "* x=tree\n");
-    expectAsGit("a", "x", "x=tree");
-}
-
-TEST_F(GitAttributesTest, TakesTheUsersFileLast)
-{
-    GitRepository(environment().home()).write(".config/git/attributes", "* x=user y=user\n");
-    repository_.write(".gitattributes", "* x=tree\n");
-    expectAsGit("a", "x", "x=tree");
-    expectAsGit("a", "y", "y=user");
+    repository_.remove(".gitattributes");
+    expectAsGit("x", "c", "c=index");
+    repository_.write(".gitattributes", "* a=tree b=tree\n");
+    repository_.write(".git/info/attributes", "* a=repository\n");
+    expectAsGit("x", "a", "a=repository");
+    expectAsGit("x", "b", "b=tree");
+    expectAsGit("x", "d", "d=user");
 }
 
 TEST_F(GitAttributesTest, TakesTheFileThatTheConfigurationNames)
@@ -184,53 +204,6 @@ TEST_F(GitAttributesTest, TakesTheFileThatTheConfigurationNames)
     GitRepository(folder().path()).write("elsewhere", "* x=configured\n");
     repository_.git({"config", "core.attributesFile", (folder() / "elsewhere").string()});
     expectAsGit("a", "x", "x=configured");
-}
-
-TEST_F(GitAttributesTest, ExpandsMacros)
-{
-    repository_.write(".gitattributes", "[attr]mine x=1 -y z\n*.m mine\n*.bin binary\n");
-    expectAsGit("a.m", "mine", "mine");
-    expectAsGit("a.m", "x", "x=1");
-    expectAsGit("a.m", "y", "-y");
-    expectAsGit("a.m", "z", "z");
-    expectAsGit("a.bin", "binary", "binary");
-    expectAsGit("a.bin", "text", "-text");
-    expectAsGit("a.bin", "diff", "-diff");
-    expectAsGit("a.bin", "merge", "-merge");
-}
-
-TEST_F(GitAttributesTest, LetsALaterLineTakeAMacroBack)
-{
-    repository_.write(".gitattributes", "*.bin binary\nspecial.bin merge=mine\n");
-    expectAsGit("special.bin", "merge", "merge=mine");
-    expectAsGit("special.bin", "diff", "-diff");
-}
-
-TEST_F(GitAttributesTest, TakesNamesAndValuesThatAreNoAscii)
-{
-    repository_.write(".gitattributes",
-                      "gr\xC3\xBC\xC3\x9F x=sch\xC3\xB6n\nfolder/\xF0\x9F\x8C\xB3 y\n");
-    expectAsGit("gr\xC3\xBC\xC3\x9F", "x", "x=sch\xC3\xB6n");
-    expectAsGit("folder/\xF0\x9F\x8C\xB3", "y", "y");
-}
-
-TEST_F(GitAttributesTest, TakesNamesAndValuesThatAreNoUtf8)
-{
-    repository_.write(".gitattributes", "caf\xE9 x=th\xE9\n");
-    expectAsGit("caf\xE9", "x", "x=th\xE9");
-}
-
-TEST_F(GitAttributesTest, TakesAFileThatDoesNotExist)
-{
-    repository_.write(".gitattributes", "*.txt x\n");
-    expectAsGit("no/such/file.txt", "x", "x");
-}
-
-TEST_F(GitAttributesTest, CountsARelativePathFromTheRoot)
-{
-    repository_.write("folder/.gitattributes", "* x\n");
-    EXPECT_EQ(ask("folder/a", "x"), "x");
-    EXPECT_EQ(ask("a", "x"), "!x");
 }
 
 TEST_F(GitAttributesTest, WorksBeforeTheFirstCommitAndInALinkedWorktree)
@@ -258,14 +231,6 @@ TEST_F(GitAttributesTest, SeesTheFilesAsTheyAreAtEachQuery)
     EXPECT_EQ(now(), "!x");
 }
 
-TEST_F(GitAttributesTest, ChangesNothing)
-{
-    repository_.write(".gitattributes", "* x\n");
-    repository_.commitAll("first");
-    const vclink::test::NothingChanges nothing(repository_);
-    ask(".gitattributes", "x");
-}
-
 TEST_F(GitAttributesTest, FailsWhereTheRepositoryCannotBeOpened)
 {
     const auto attributes = GitAttributes::create(*adapter_);
@@ -275,31 +240,11 @@ TEST_F(GitAttributesTest, FailsWhereTheRepositoryCannotBeOpened)
               GIT_ENOTFOUND);
 }
 
-TEST_F(GitAttributesTest, LogsNothing)
+TEST_F(GitAttributesTest, IsMadeForGitAdaptersAndHasOneOperationBehindTheDestructor)
 {
-    repository_.write(".gitattributes", "* x\n");
-    const vclink::test::LogCapture log;
-    ask("a", "x");
-    EXPECT_THAT(log.messages(), IsEmpty());
-}
-
-TEST_F(GitAttributesTest, LeavesNoDescriptorOpen)
-{
-    repository_.write(".gitattributes", "* x\n");
-    ask("a", "x");
-    const vclink::test::NoDescriptorLeak noLeak;
-    EXPECT_EQ(ask("a", "x"), "x");
-}
-
-TEST_F(GitAttributesTest, IsMadeForNoOtherAdapter)
-{
-    vclink::test::OtherAdapter other;
+    OtherAdapter other;
     EXPECT_THROW(static_cast<void>(GitAttributes::create(other)), std::bad_cast);
-}
-
-TEST_F(GitAttributesTest, HasItsOneOperationBehindTheDestructor)
-{
-    EXPECT_EQ(vclink::test::slotOf(&GitAttributes::getAttribute), 2U);
+    EXPECT_EQ(slotOf(&GitAttributes::getAttribute), 2U);
     EXPECT_TRUE(std::has_virtual_destructor_v<GitAttributes>);
     EXPECT_TRUE(std::is_abstract_v<GitAttributes>);
     EXPECT_FALSE(std::is_copy_constructible_v<GitAttributes>);

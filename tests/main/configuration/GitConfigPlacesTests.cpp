@@ -1,7 +1,5 @@
 // SPDX-License-Identifier: MIT
-#include <functional>
 #include <map>
-#include <memory>
 #include <string>
 #include <type_traits>
 
@@ -16,10 +14,10 @@ namespace
 {
 
 using vclink::git::GitConfig;
-using vclink::test::shown;
+using namespace vclink::test;
 
 /// Where libgit2 looks when it starts.
-class GitConfigPlaces : public vclink::test::GitConfigFixture
+class GitConfigPlaces : public GitConfigFixture
 {
   protected:
     /// What the diff tool's value is, or the code of the constructor's failure.
@@ -68,52 +66,22 @@ TEST_F(GitConfigPlaces, HaveTheXdgFolderInTheHomeFolderByDefault)
               "of the folder, no path");
 }
 
-class GitConfigObject : public vclink::test::GitConfigFixture
+/// GitConfig keeps libgit2 alive, and leaves nothing behind where it cannot be made.
+TEST_F(GitConfigPlaces, AreReadByAnObjectThatStartsLibGit2)
 {
-};
-
-TEST_F(GitConfigObject, HoldsOnePointer)
-{
-    using Erased = std::unique_ptr<int, std::function<void(int *)>>;
-    EXPECT_EQ(sizeof(GitConfig), sizeof(Erased));
-}
-
-TEST_F(GitConfigObject, IsNotCopied)
-{
-    EXPECT_FALSE(std::is_copy_constructible_v<GitConfig>);
-    EXPECT_FALSE(std::is_copy_assignable_v<GitConfig>);
-}
-
-TEST_F(GitConfigObject, KeepsLibGit2Alive)
-{
-    const auto starts = []
-    {
-        const int count = git_libgit2_init() - 1;
-        git_libgit2_shutdown();
-        return count;
-    };
-    const int before = starts();
+    const int before = countLibGit2Starts();
     {
         const GitConfig config;
-        EXPECT_EQ(starts(), before + 1);
+        EXPECT_EQ(countLibGit2Starts(), before + 1);
     }
-    EXPECT_EQ(starts(), before);
-}
-
-TEST_F(GitConfigObject, LeavesNothingBehindWhenItCannotBeMade)
-{
+    EXPECT_EQ(countLibGit2Starts(), before);
     writeFile(global(), "[broken\n");
-    const auto starts = []
-    {
-        const int count = git_libgit2_init() - 1;
-        git_libgit2_shutdown();
-        return count;
-    };
     EXPECT_THROW(GitConfig(), vclink::git::LibGit2Exception);
-    const int before = starts();
-    const vclink::test::NoDescriptorLeak noLeak;
+    const NoDescriptorLeak noLeak;
     EXPECT_THROW(GitConfig(), vclink::git::LibGit2Exception);
-    EXPECT_EQ(starts(), before);
+    EXPECT_EQ(countLibGit2Starts(), before);
+    EXPECT_FALSE(std::is_copy_constructible_v<GitConfig>);
+    EXPECT_FALSE(std::is_copy_assignable_v<GitConfig>);
 }
 
 } // namespace

@@ -9,7 +9,6 @@
 #include <gtest/gtest.h>
 
 #include "GitConfigFixture.hpp"
-#include "support/Descriptors.hpp"
 #include "support/Failure.hpp"
 #include "support/LogCapture.hpp"
 #include "support/UnprivilegedUser.hpp"
@@ -22,11 +21,7 @@ namespace
 using testing::HasSubstr;
 using testing::IsEmpty;
 using vclink::git::GitConfig;
-using vclink::test::asBytes;
-using vclink::test::asUtf8;
-using vclink::test::failureOf;
-using vclink::test::runAsUnprivilegedUser;
-using vclink::test::shown;
+using namespace vclink::test;
 
 const std::string driverOfOptHost = "\"/opt/host/bin/lnxhost/vkAutoMerge.sh\" %O %A %B %A";
 const std::string mergeToolOfOptHost =
@@ -34,14 +29,14 @@ const std::string mergeToolOfOptHost =
 const std::string diffToolOfOptHost = "\"/opt/host/bin/lnxhost/vkDiff\" $LOCAL $PWD/$REMOTE";
 
 /// The user's files as they are on a machine, with "/opt/host" as the place of installation.
-class GitConfigFile : public vclink::test::GitConfigFixture
+class GitConfigFile : public GitConfigFixture
 {
   protected:
     GitConfigFile() : installation_("/opt/host")
     {
     }
 
-    const vclink::test::InstallPath installation_;
+    const InstallPath installation_;
 };
 
 TEST_F(GitConfigFile, ThatIsMissingHasNoValuesAndNoPath)
@@ -67,12 +62,14 @@ TEST_F(GitConfigFile, ThatIsMissingIsMadeByTheFirstWrite)
     EXPECT_EQ(config.readDiffTool(), std::nullopt);
 }
 
-TEST_F(GitConfigFile, HoldsTheseLinesAfterAllThreeWrites)
+TEST_F(GitConfigFile, HoldsTheseLinesAfterAllThreeWritesAndGivesThemBackAsGitDoes)
 {
     GitConfig config;
     config.writeAutoMergeDriver();
     config.writeMergeTool();
     config.writeDiffTool();
+    // No write adds a line that stands already.
+    config.writeAutoMergeDriver();
     EXPECT_EQ(read(global()),
               "[merge \"vkAutoMerge\"]\n"
               "\tdriver = \\\"/opt/host/bin/lnxhost/vkAutoMerge.sh\\\" %O %A %B %A\n"
@@ -81,25 +78,13 @@ TEST_F(GitConfigFile, HoldsTheseLinesAfterAllThreeWrites)
               "$PWD/$MERGED\n"
               "[difftool \"vkDiff\"]\n"
               "\tcmd = \\\"/opt/host/bin/lnxhost/vkDiff\\\" $LOCAL $PWD/$REMOTE\n");
-}
-
-TEST_F(GitConfigFile, GivesBackWhatWasWrittenWithItsQuotes)
-{
-    GitConfig config;
-    config.writeAutoMergeDriver();
-    config.writeMergeTool();
-    config.writeDiffTool();
-    EXPECT_EQ(shown(config.readAutoMergeDriver()), driverOfOptHost);
-    EXPECT_EQ(shown(config.readMergeTool()), mergeToolOfOptHost);
-    EXPECT_EQ(shown(config.readDiffTool()), diffToolOfOptHost);
-}
-
-TEST_F(GitConfigFile, SaysTheSameToGit)
-{
-    GitConfig config;
-    config.writeAutoMergeDriver();
-    config.writeMergeTool();
-    config.writeDiffTool();
+    const GitConfig another;
+    const LogCapture log;
+    EXPECT_EQ(shown(another.readAutoMergeDriver()), driverOfOptHost);
+    EXPECT_EQ(shown(another.readMergeTool()), mergeToolOfOptHost);
+    EXPECT_EQ(shown(another.readDiffTool()), diffToolOfOptHost);
+    EXPECT_NE(another.globalFilePath(), std::nullopt);
+    EXPECT_THAT(log.messages(), IsEmpty());
     EXPECT_EQ(byGit("merge.vkAutoMerge.driver"), driverOfOptHost);
     EXPECT_EQ(byGit("mergetool.vkMerge.cmd"), mergeToolOfOptHost);
     EXPECT_EQ(byGit("difftool.vkDiff.cmd"), diffToolOfOptHost);
@@ -110,7 +95,7 @@ TEST_F(GitConfigFile, KeepsAnInstallPathOfAnyLetters)
     for (const std::string root : {"/opt/my host", "/opt/gr\xC3\xBC\xC3\x9F", "/opt/say \"host\"",
                                    "/opt/back\\slash", "/opt/#1; x", "/opt/caf\xE9"})
     {
-        const vclink::test::InstallPath installation(root);
+        const InstallPath installation(root);
         GitConfig config;
         config.writeDiffTool();
         const std::string expected = '"' + root + "/bin/lnxhost/vkDiff\" $LOCAL $PWD/$REMOTE";
@@ -135,34 +120,16 @@ TEST_F(GitConfigFile, IsLeftAloneWhereAKeyHasSeveralValuesOrAnIncludedOne)
     EXPECT_EQ(read(environment().home() / "included"), tool);
 }
 
-TEST_F(GitConfigFile, IsReadByAnotherObject)
-{
-    GitConfig().writeDiffTool();
-    EXPECT_EQ(shown(GitConfig().readDiffTool()), diffToolOfOptHost);
-}
-
 TEST_F(GitConfigFile, GivesAValueThatGitWrote)
 {
     writeFile(global(),
               "[merge \"vkAutoMerge\"]\n\tdriver = \"a \\\"b\\\" \\\\ # no comment\" ; c\n"
               "[mergetool \"vkMerge\"]\n\tcmd = gr\xC3\xBC\xC3\x9F \\\n  more\n"
-              "[difftool \"vkDiff\"]\n\tcmd\n");
+              "[difftool \"vkDiff\"]\n\tcmd = one\n\tcmd\n");
     const GitConfig config;
     EXPECT_EQ(shown(config.readAutoMergeDriver()), "a \"b\" \\ # no comment");
     EXPECT_EQ(shown(config.readMergeTool()), byGit("mergetool.vkMerge.cmd"));
-    EXPECT_EQ(shown(config.readDiffTool()), "") << "a key without a value";
-}
-
-TEST_F(GitConfigFile, GivesTheLastOfSeveralValues)
-{
-    writeFile(global(), "[difftool \"vkDiff\"]\n\tcmd = one\n\tcmd = two\n");
-    EXPECT_EQ(shown(GitConfig().readDiffTool()), "two");
-}
-
-TEST_F(GitConfigFile, TellsSectionsByTheirExactSubsection)
-{
-    writeFile(global(), "[difftool \"vkdiff\"]\n\tcmd = other\n");
-    EXPECT_EQ(GitConfig().readDiffTool(), std::nullopt);
+    EXPECT_EQ(shown(config.readDiffTool()), "") << "the last, a key without a value";
 }
 
 TEST_F(GitConfigFile, HasAnExistingValueReplaced)
@@ -177,34 +144,13 @@ TEST_F(GitConfigFile, HasAnExistingValueReplaced)
                               "\tmore = x\n[user]\n\tname = Somebody\n");
 }
 
-TEST_F(GitConfigFile, IsTheSameAfterASecondWrite)
-{
-    GitConfig config;
-    config.writeAutoMergeDriver();
-    const std::string once = read(global());
-    config.writeAutoMergeDriver();
-    EXPECT_EQ(read(global()), once);
-}
-
-TEST_F(GitConfigFile, IsReadAnewWhenOthersChangeIt)
-{
-    const GitConfig config;
-    EXPECT_EQ(config.readDiffTool(), std::nullopt);
-    GitConfig().writeDiffTool();
-    EXPECT_EQ(shown(GitConfig().readDiffTool()), diffToolOfOptHost);
-}
-
-TEST_F(GitConfigFile, OfARepositoryIsNotSeen)
+/// Of a repository, of the system, and a subsection in other letters.
+TEST_F(GitConfigFile, OfOthersIsNotSeen)
 {
     const auto repository = makeRepository();
     repository.git({"config", "difftool.vkDiff.cmd", "of the repository"});
-    EXPECT_EQ(GitConfig().readDiffTool(), std::nullopt);
-}
-
-TEST_F(GitConfigFile, OfTheSystemIsNotSeen)
-{
     writeFile(folder() / "etc/gitconfig", "[difftool \"vkDiff\"]\n\tcmd = of the system\n");
-    writeFile(global(), "[user]\n\tname = Somebody\n");
+    writeFile(global(), "[difftool \"vkdiff\"]\n\tcmd = other\n");
     EXPECT_EQ(GitConfig().readDiffTool(), std::nullopt);
 }
 
@@ -245,28 +191,23 @@ TEST_F(GitConfigFile, MayBeALink)
     EXPECT_EQ(byGit("user.name"), "Somebody");
 }
 
-TEST_F(GitConfigFile, ThatIsBrokenIsRefusedAtOnceAndStays)
-{
-    writeFile(global(), "[broken\n");
-    EXPECT_EQ(failureOf([&] { GitConfig config; }).errorClass, GIT_ERROR_CONFIG);
-    EXPECT_EQ(read(global()), "[broken\n");
-}
-
-TEST_F(GitConfigFile, ThatIsLockedIsNotWritten)
+TEST_F(GitConfigFile, ThatIsLockedOrBrokenIsNotWritten)
 {
     writeFile(global(), "[user]\n\tname = Somebody\n");
     writeFile(global().string() + ".lock", "");
     GitConfig config;
-    const auto failure = vclink::test::failureOf([&] { config.writeDiffTool(); });
-    EXPECT_EQ(failure.code, GIT_ELOCKED);
+    EXPECT_EQ(failureOf([&] { config.writeDiffTool(); }).code, GIT_ELOCKED);
     EXPECT_EQ(read(global()), "[user]\n\tname = Somebody\n");
     EXPECT_EQ(config.readDiffTool(), std::nullopt);
+    writeFile(global(), "[broken\n");
+    EXPECT_EQ(failureOf([] { GitConfig broken; }).errorClass, GIT_ERROR_CONFIG);
+    EXPECT_EQ(read(global()), "[broken\n");
 }
 
 TEST_F(GitConfigFile, InAFolderThatCannotBeWrittenIsNotWritten)
 {
     writeFile(global(), "[user]\n\tname = Somebody\n");
-    vclink::test::giveToUnprivilegedUser(environment().home());
+    giveToUnprivilegedUser(environment().home());
     std::filesystem::permissions(environment().home(), std::filesystem::perms(0555));
     const std::string answer = runAsUnprivilegedUser(
         []() -> std::string
@@ -307,27 +248,6 @@ TEST_F(GitConfigFile, ThatCannotBeReadMakesTheConstructorRaise)
     EXPECT_EQ(runAsUnprivilegedUser(answer), "mine");
     std::filesystem::permissions(global(), std::filesystem::perms(0));
     EXPECT_EQ(runAsUnprivilegedUser(answer), "raised " + std::to_string(GIT_ENOTFOUND));
-}
-
-TEST_F(GitConfigFile, GivesItsReadsNoRecords)
-{
-    const GitConfig config;
-    const vclink::test::LogCapture log;
-    config.readAutoMergeDriver();
-    config.readMergeTool();
-    config.readDiffTool();
-    config.globalFilePath();
-    EXPECT_THAT(log.messages(), IsEmpty());
-}
-
-TEST_F(GitConfigFile, LeavesNoDescriptorOpen)
-{
-    GitConfig().writeDiffTool();
-    const vclink::test::NoDescriptorLeak noLeak;
-    GitConfig config;
-    config.writeMergeTool();
-    config.readMergeTool();
-    config.globalFilePath();
 }
 
 } // namespace

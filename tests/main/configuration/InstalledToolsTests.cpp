@@ -9,8 +9,8 @@
 #include "GitConfigFixture.hpp"
 #include "error/logging/severity.hpp"
 #include "main/merge/MergeFixture.hpp"
-#include "support/Descriptors.hpp"
 #include "support/LogCapture.hpp"
+#include "support/NothingLeft.hpp"
 #include "vclink/git/GitConfig.hpp"
 #include "vclink/git/LibGit2Guard.hpp"
 
@@ -21,9 +21,7 @@ namespace git = vclink::git;
 using testing::ElementsAre;
 using testing::HasSubstr;
 using testing::IsEmpty;
-using vclink::test::GitRepository;
-using vclink::test::InstallPath;
-using vclink::test::LogCapture;
+using namespace vclink::test;
 
 const std::string ancestorText = "1\n2\n3\n4\n5\n6\n7\n8\n9\n";
 const std::string ourText = "ours\n2\n3\n4\n5\n6\n7\n8\n9\n";
@@ -32,8 +30,7 @@ const std::string bothTexts = "ours\n2\n3\n4\n5\n6\n7\n8\ntheirs\n";
 
 /// The host's own launchers, installed below a folder of the test, whose values are written into
 /// the user's configuration. The parameter is the folder's name.
-class InstalledTools : public vclink::test::MergeFixture,
-                       public testing::WithParamInterface<std::string>
+class InstalledTools : public MergeFixture, public testing::WithParamInterface<std::string>
 {
   protected:
     InstalledTools()
@@ -62,8 +59,7 @@ class InstalledTools : public vclink::test::MergeFixture,
     {
         repository_.write(".gitattributes", "file merge=vkAutoMerge\n");
         repository_.commitAll("attributes");
-        diverge([&] { repository_.write("file", oursOfFile); },
-                [&] { repository_.write("file", theirsOfFile); });
+        diverge(writing("file", oursOfFile), writing("file", theirsOfFile));
     }
     /// Puts a note in the place of the launcher, so that a run of it can be seen.
     void replaceAutoMerge(const std::string &script) const
@@ -89,26 +85,14 @@ class InstalledTools : public vclink::test::MergeFixture,
     std::unique_ptr<git::LibGit2Guard> guard_;
 };
 
-TEST_P(InstalledTools, MergeInARealMerge)
+TEST_P(InstalledTools, MergeInARealMergeToTheSameAsInGit)
 {
     divergeInLines();
-    const std::string head = idOf("HEAD");
-    {
-        const LogCapture log(git::SeverityDiagnostic);
-        merge("topic");
-        expectStarted(log);
-        EXPECT_THAT(log.messages(), testing::Contains("Auto-merge successful"));
-    }
-    EXPECT_EQ(repository_.read("file"), bothTexts);
-    EXPECT_THAT(parents(), ElementsAre(head, idOf("topic")));
-    EXPECT_THAT(status(), IsEmpty());
-    EXPECT_TRUE(nothingIsLeft());
-}
-
-TEST_P(InstalledTools, MergeToTheSameInGit)
-{
-    divergeInLines();
-    expectAsGit();
+    const LogCapture log(git::SeverityDiagnostic);
+    const NothingLeft nothingLeft(environment().temporary());
+    expectCleanAsGit();
+    expectStarted(log);
+    EXPECT_THAT(log.messages(), testing::Contains("Auto-merge successful"));
     EXPECT_EQ(repository_.read("file"), bothTexts);
 }
 
@@ -149,13 +133,6 @@ TEST_P(InstalledTools, LeaveConflictsThatTheyCannotMerge)
     EXPECT_TRUE(nothingIsLeft());
 }
 
-TEST_P(InstalledTools, LeaveNoDescriptorOpen)
-{
-    divergeInLines();
-    const vclink::test::NoDescriptorLeak noLeak;
-    merge("topic");
-}
-
 TEST_P(InstalledTools, ThatAreGoneFailTheMerge)
 {
     divergeInLines();
@@ -166,8 +143,7 @@ TEST_P(InstalledTools, ThatAreGoneFailTheMerge)
 
 TEST_P(InstalledTools, ServeGitsMergeTool)
 {
-    diverge([this] { repository_.write("file", ourText); },
-            [this] { repository_.write("file", theirText); });
+    diverge(writing("file", ourText), writing("file", theirText));
     // A conflict that the tool can merge, since only git is told to leave the file alone.
     repository_.write(".git/info/attributes", "file -merge\n");
     EXPECT_FALSE(repository_.tryGit({"merge", "--quiet", "--no-edit", "topic"}).succeeded());
@@ -180,8 +156,7 @@ TEST_P(InstalledTools, ServeGitsMergeTool)
 
 TEST_P(InstalledTools, TellGitsMergeToolWhatTheyCannotMerge)
 {
-    diverge([this] { repository_.write("file", "ours\n"); },
-            [this] { repository_.write("file", "theirs\n"); });
+    diverge(writing("file", "ours\n"), writing("file", "theirs\n"));
     EXPECT_FALSE(repository_.tryGit({"merge", "--quiet", "--no-edit", "topic"}).succeeded());
     const std::string before = repository_.read("file");
     const auto result = repository_.tryGit({"-c", "mergetool.vkMerge.trustExitCode=true",

@@ -19,12 +19,15 @@ using vclink::git::quotedCommand;
 using vclink::git::toolLauncherPath;
 using vclink::test::InstallPath;
 
-TEST(ToolCommands, HaveTheirPlacesInTheConfiguration)
+TEST(ToolCommands, HaveTheirPlacesInTheConfigurationAndTheirArguments)
 {
     EXPECT_EQ(configKeyString(autoMergeDriver().key), "merge.vkAutoMerge.driver");
     EXPECT_EQ(configKeyString(mergeTool().key), "mergetool.vkMerge.cmd");
     EXPECT_EQ(configKeyString(diffTool().key), "difftool.vkDiff.cmd");
     EXPECT_EQ(autoMergeDriver().key.subsection, "vkAutoMerge");
+    EXPECT_EQ(autoMergeDriver().arguments, "%O %A %B %A");
+    EXPECT_EQ(mergeTool().arguments, "$PWD/$BASE $PWD/$LOCAL $PWD/$REMOTE $PWD/$MERGED");
+    EXPECT_EQ(diffTool().arguments, "$LOCAL $PWD/$REMOTE");
 }
 
 TEST(ToolCommands, JoinAKeyWithAndWithoutASubsection)
@@ -35,44 +38,21 @@ TEST(ToolCommands, JoinAKeyWithAndWithoutASubsection)
     EXPECT_EQ(configKeyString(ConfigKey{"section", "", "name"}), "section..name");
 }
 
-TEST(ToolCommands, StartLaunchersBelowTheInstallation)
+TEST(ToolCommands, StartLaunchersBelowTheInstallationOfTheMoment)
 {
-    const InstallPath installation("/opt/host");
-    EXPECT_EQ(toolLauncherPath(autoMergeDriver()), "/opt/host/bin/lnxhost/vkAutoMerge.sh");
-    EXPECT_EQ(toolLauncherPath(mergeTool()), "/opt/host/bin/lnxhost/vkMerge");
-    EXPECT_EQ(toolLauncherPath(diffTool()), "/opt/host/bin/lnxhost/vkDiff");
-}
-
-TEST(ToolCommands, FollowTheInstallationOfTheMoment)
-{
-    for (const std::string root : {"/opt/my host", "/opt/gr\xC3\xBC\xC3\x9F", "/opt/a.b/c.d",
-                                   "/opt/say \"host\"", "/opt/caf\xE9"})
+    for (const std::string root : {"/opt/host", "/opt/my host", "/opt/gr\xC3\xBC\xC3\x9F",
+                                   "/opt/a.b/c.d", "/opt/say \"host\"", "/opt/caf\xE9"})
     {
         const InstallPath installation(root);
         EXPECT_EQ(toolLauncherPath(autoMergeDriver()), root + "/bin/lnxhost/vkAutoMerge.sh");
+        EXPECT_EQ(toolLauncherPath(mergeTool()), root + "/bin/lnxhost/vkMerge");
         EXPECT_EQ(toolLauncherPath(diffTool()), root + "/bin/lnxhost/vkDiff");
     }
-}
-
-TEST(ToolCommands, PutNoSecondSlashAfterTheRoot)
-{
     const InstallPath installation("/");
-    EXPECT_EQ(toolLauncherPath(mergeTool()), "/bin/lnxhost/vkMerge");
-}
-
-TEST(ToolCommands, HaveNoLauncherNameWhereItIsEmpty)
-{
-    const InstallPath installation("/opt/host");
     auto tool = mergeTool();
+    EXPECT_EQ(toolLauncherPath(tool), "/bin/lnxhost/vkMerge") << "no second slash";
     tool.launcher.clear();
-    EXPECT_EQ(toolLauncherPath(tool), "/opt/host/bin/lnxhost");
-}
-
-TEST(ToolCommands, GiveTheirLaunchersTheseArguments)
-{
-    EXPECT_EQ(autoMergeDriver().arguments, "%O %A %B %A");
-    EXPECT_EQ(mergeTool().arguments, "$PWD/$BASE $PWD/$LOCAL $PWD/$REMOTE $PWD/$MERGED");
-    EXPECT_EQ(diffTool().arguments, "$LOCAL $PWD/$REMOTE");
+    EXPECT_EQ(toolLauncherPath(tool), "/bin/lnxhost");
 }
 
 TEST(ToolCommands, QuoteTheLauncherAndNothingElse)
