@@ -16,14 +16,12 @@ namespace
 
 using vclink::git::GitAdapterFactory;
 using vclink::git::LibGit2Exception;
-using vclink::test::asPath;
-using vclink::test::GitRepository;
-using vclink::test::States;
+using namespace vclink::test;
 
 constexpr int rounds = 50;
 constexpr int threads = 4;
 
-class AdapterThreads : public vclink::test::AdapterFixture
+class AdapterThreads : public AdapterFixture
 {
   protected:
     /// Runs the action on several threads at once, each with its number.
@@ -48,39 +46,26 @@ class AdapterThreads : public vclink::test::AdapterFixture
     }
 };
 
-TEST_F(AdapterThreads, HaveTwoAdaptersOfTwoRepositories)
+/// Each of its own repository, and all of one.
+TEST_F(AdapterThreads, HaveAdaptersOfSeveralRepositoriesOrOfOne)
 {
     std::vector<GitRepository> repositories;
     for (int number = 0; number < threads; ++number)
         repositories.push_back(repositoryNumber(number));
-    const auto query = [&](int number)
+    const auto countStates = [&](std::size_t number)
     {
-        const upath root = asPath(repositories[static_cast<std::size_t>(number)].path());
+        const upath root = asPath(repositories[number].path());
         const auto adapter = GitAdapterFactory().createAdapterFor(root, interactor_);
         for (int i = 0; i < rounds; ++i)
         {
-            if (adapter->getFolderStates(root).size() != static_cast<std::size_t>(number) + 1)
+            if (adapter->getFolderStates(root).size() != number + 1)
                 return false;
         }
         return true;
     };
-    EXPECT_EQ(countWrong(query), 0);
-}
-
-TEST_F(AdapterThreads, HaveTwoAdaptersOfOneRepository)
-{
-    const GitRepository repository = repositoryNumber(7);
-    const auto query = [&](int)
-    {
-        const auto adapter = makeAdapter(repository.path());
-        for (int i = 0; i < rounds; ++i)
-        {
-            if (adapter->getFolderStates(asPath(repository.path())).size() != 8)
-                return false;
-        }
-        return true;
-    };
-    EXPECT_EQ(countWrong(query), 0);
+    EXPECT_EQ(countWrong([&](int number) { return countStates(static_cast<std::size_t>(number)); }),
+              0);
+    EXPECT_EQ(countWrong([&](int) { return countStates(threads - 1); }), 0);
 }
 
 TEST_F(AdapterThreads, StartAndEndLibGit2AtOnce)
@@ -120,7 +105,7 @@ TEST_F(AdapterThreads, RaiseEachItsOwnFailure)
             }
             catch (const LibGit2Exception &exception)
             {
-                const auto text = vclink::test::asUtf8(exception.getError().getMessage());
+                const auto text = asUtf8(exception.getError().getMessage());
                 if (text.find(root + '\'') == std::string::npos)
                     return false;
             }

@@ -27,12 +27,7 @@ namespace
 {
 
 namespace git = vclink::git;
-using vclink::test::asPath;
-using vclink::test::asUtf16;
-using vclink::test::asUtf8;
-using vclink::test::Failure;
-using vclink::test::failureOf;
-using vclink::test::LibGit2Recorder;
+using namespace vclink::test;
 
 /// Functions whose text is never shown: they give no code, the library does not look at it, or they
 /// fail with a text of their own only.
@@ -62,7 +57,7 @@ struct Silence
     std::function<void()> operation;
 };
 
-class EarlierTexts : public vclink::test::RemoteFixture
+class EarlierTexts : public RemoteFixture
 {
   protected:
     EarlierTexts()
@@ -89,16 +84,6 @@ class EarlierTexts : public vclink::test::RemoteFixture
     {
         return asPath(repository_.path().string() + '/' + name);
     }
-    void expectNoText(const std::vector<Silence> &silences)
-    {
-        for (const auto &silence : silences)
-        {
-            silence.begin();
-            EXPECT_EQ(failureOf(silence.operation), (Failure{GIT_ERROR, 0, ""}))
-                << silence.function;
-        }
-    }
-
     LibGit2Recorder calls_;
 };
 
@@ -165,7 +150,7 @@ TEST_F(EarlierTexts, AreGoneBeforeEachCallThatCanLeaveOne)
     {
         const bool canLeaveOne =
             calls_.calls().back().givesCode && functionsWithoutText.count(name) == 0;
-        EXPECT_TRUE(!canLeaveOne || vclink::test::libgit2Release::isSilent()) << name;
+        EXPECT_TRUE(!canLeaveOne || libgit2Release::isSilent()) << name;
     };
     EXPECT_TRUE(git::GitAdapterFactory().isAdapterFor(asPath(repository_.path())));
     adapter_->getFileStates({file});
@@ -192,19 +177,17 @@ TEST_F(EarlierTexts, AreGoneBeforeEachCallThatCanLeaveOne)
     EXPECT_GT(calls_.calls().size(), 200U);
 }
 
-TEST_F(EarlierTexts, AreNotThoseOfFailuresOfFiles)
+TEST_F(EarlierTexts, AreNotThoseOfFailures)
 {
-    expectNoText(silencesOfFiles());
-}
-
-TEST_F(EarlierTexts, AreNotThoseOfFailuresOfBranches)
-{
-    expectNoText(silencesOfBranches());
-}
-
-TEST_F(EarlierTexts, AreNotThoseOfFailuresOfRemotes)
-{
-    expectNoText(silencesOfRemotes());
+    for (const auto &silences : {silencesOfFiles(), silencesOfBranches(), silencesOfRemotes()})
+    {
+        for (const auto &silence : silences)
+        {
+            silence.begin();
+            EXPECT_EQ(failureOf(silence.operation), (Failure{GIT_ERROR, 0, ""}))
+                << silence.function;
+        }
+    }
 }
 
 TEST_F(EarlierTexts, AreNotThoseOfAMergeThatFails)
@@ -217,10 +200,8 @@ TEST_F(EarlierTexts, AreNotThoseOfAMergeThatFails)
     }
     catch (const git::GitException &exception)
     {
-        EXPECT_EQ(asUtf8(exception.GetUnicodeMessageTxt()).find(vclink::test::earlierText),
-                  std::string::npos);
-        EXPECT_NE(asUtf8(exception.GetUnicodeMessageTxt())
-                      .find(vclink::test::textOf(Failure{GIT_ERROR, 0, ""})),
+        EXPECT_EQ(asUtf8(exception.GetUnicodeMessageTxt()).find(earlierText), std::string::npos);
+        EXPECT_NE(asUtf8(exception.GetUnicodeMessageTxt()).find(textOf(Failure{GIT_ERROR, 0, ""})),
                   std::string::npos);
     }
 }

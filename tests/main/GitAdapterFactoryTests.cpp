@@ -1,7 +1,6 @@
 // SPDX-License-Identifier: MIT
 #include <memory>
 #include <string>
-#include <type_traits>
 
 #include <git2.h>
 #include <gtest/gtest.h>
@@ -18,10 +17,9 @@ namespace
 using vclink::ApplicationInteractor;
 using vclink::git::GitAdapterFactory;
 using vclink::git::LibGit2Exception;
-using vclink::test::asPath;
-using vclink::test::asUtf8;
+using namespace vclink::test;
 
-class GitAdapterFactoryTest : public vclink::test::AdapterFixture
+class GitAdapterFactoryTest : public AdapterFixture
 {
   protected:
     std::unique_ptr<vclink::CMAdapter> create(const upath &root) const
@@ -29,17 +27,6 @@ class GitAdapterFactoryTest : public vclink::test::AdapterFixture
         return GitAdapterFactory().createAdapterFor(root, interactor_);
     }
 };
-
-TEST_F(GitAdapterFactoryTest, IsNamedGit)
-{
-    EXPECT_EQ(GitAdapterFactory().getName(), u"git");
-}
-
-TEST_F(GitAdapterFactoryTest, HasNoData)
-{
-    EXPECT_EQ(sizeof(GitAdapterFactory), sizeof(vclink::CMAdapterFactory));
-    EXPECT_TRUE((std::is_base_of_v<vclink::CMAdapterFactory, GitAdapterFactory>));
-}
 
 TEST_F(GitAdapterFactoryTest, ServesTheHostThroughItsInterface)
 {
@@ -54,11 +41,16 @@ TEST_F(GitAdapterFactoryTest, ServesTheHostThroughItsInterface)
     EXPECT_EQ(adapter->getFolderStates(adapter->getRootFolder()).size(), 1U);
 }
 
-TEST_F(GitAdapterFactoryTest, MakesAnAdapterForAFolderNeverAskedAbout)
+TEST_F(GitAdapterFactoryTest, MakesAnAdapterForAFolderThatIsARepositoryOnlyLater)
 {
-    const auto adapter = create(asPath(folder() / "missing"));
+    const upath root = asPath(folder() / "later");
+    const auto adapter = create(root);
     ASSERT_NE(adapter, nullptr);
-    EXPECT_EQ(asUtf8(adapter->getRootFolder().string()), (folder() / "missing").string());
+    EXPECT_EQ(asUtf8(adapter->getRootFolder().string()), (folder() / "later").string());
+    EXPECT_THROW(adapter->getFolderStates(root), LibGit2Exception);
+    EXPECT_THROW(adapter->getFolderStates(root), LibGit2Exception);
+    makeRepository("later").write("file", "x");
+    EXPECT_EQ(adapter->getFolderStates(root).size(), 1U);
 }
 
 TEST_F(GitAdapterFactoryTest, LetsTheFirstOperationRaiseForAFolderThatIsNoRepository)
@@ -76,7 +68,7 @@ TEST_F(GitAdapterFactoryTest, LetsTheFirstOperationRaiseForAFolderThatIsNoReposi
         EXPECT_EQ(exception.getError().getErrorClass(), GIT_ERROR_REPOSITORY);
         const std::string own = asUtf8(exception.getError().getMessage());
         EXPECT_EQ(own, "could not find repository " +
-                           std::string(vclink::test::libgit2Release::whereNoRepositoryIs) + " '" +
+                           std::string(libgit2Release::whereNoRepositoryIs) + " '" +
                            environment().home().string() + "'");
         const std::string text = asUtf8(exception.GetUnicodeMessageTxt());
         EXPECT_NE(text.find(own), std::string::npos) << text;
@@ -84,16 +76,6 @@ TEST_F(GitAdapterFactoryTest, LetsTheFirstOperationRaiseForAFolderThatIsNoReposi
         EXPECT_EQ(exception.GetID(), "shared_vclink:git:LibGit2Error");
     }
     EXPECT_EQ(adapter->getRootFolder(), home);
-}
-
-TEST_F(GitAdapterFactoryTest, RaisesAgainAndWorksOnceTheRepositoryIsThere)
-{
-    const upath root = asPath(folder() / "later");
-    const auto adapter = create(root);
-    EXPECT_THROW(adapter->getFolderStates(root), LibGit2Exception);
-    EXPECT_THROW(adapter->getFolderStates(root), LibGit2Exception);
-    makeRepository("later").write("file", "x");
-    EXPECT_EQ(adapter->getFolderStates(root).size(), 1U);
 }
 
 TEST_F(GitAdapterFactoryTest, TakesAShareOfTheInteractorAndLetsTheArgumentGo)
@@ -109,15 +91,6 @@ TEST_F(GitAdapterFactoryTest, TakesAShareOfTheInteractorAndLetsTheArgumentGo)
     EXPECT_FALSE(watched.expired());
     adapter.reset();
     EXPECT_TRUE(watched.expired());
-}
-
-TEST_F(GitAdapterFactoryTest, HandsEachAdapterToItsCallerAlone)
-{
-    const upath root = asPath(folder().path());
-    const auto first = create(root);
-    const auto second = create(root);
-    EXPECT_NE(first.get(), second.get());
-    EXPECT_TRUE((std::is_same_v<decltype(create(root)), std::unique_ptr<vclink::CMAdapter>>));
 }
 
 } // namespace

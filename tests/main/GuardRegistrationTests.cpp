@@ -1,9 +1,12 @@
 // SPDX-License-Identifier: MIT
 // The life of the merge driver's registration, seen through merges.
+#include <functional>
 #include <memory>
 #include <optional>
 #include <string>
 #include <thread>
+#include <utility>
+#include <vector>
 
 #include <git2.h>
 #include <git2/sys/merge.h>
@@ -25,17 +28,17 @@ namespace
 {
 
 using vclink::git::BranchManager;
+using vclink::git::GitAdapter;
 using vclink::git::GitAdapterFactory;
 using vclink::git::LibGit2Guard;
-using vclink::test::asPath;
-using vclink::test::GitRepository;
+using namespace vclink::test;
 
 bool isRegistered()
 {
     return git_merge_driver_lookup("*") != nullptr;
 }
 
-class GuardRegistration : public vclink::test::AdapterFixture
+class GuardRegistration : public AdapterFixture
 {
   protected:
     GuardRegistration()
@@ -81,67 +84,34 @@ class GuardRegistration : public vclink::test::AdapterFixture
     GitRepository repository_ = makeRepository();
 };
 
-TEST_F(GuardRegistration, StandsForTheLifeOfTheOnlyGuard)
-{
-    EXPECT_FALSE(isRegistered());
-    {
-        const LibGit2Guard guard;
-        EXPECT_TRUE(isRegistered());
-    }
-    EXPECT_FALSE(isRegistered());
-}
-
-TEST_F(GuardRegistration, LetsTheMergesOfAnAdapterRunTheCommand)
-{
-    const auto adapter = newAdapter();
-    EXPECT_TRUE(runsTheCommand(*adapter));
-    EXPECT_TRUE(runsTheCommand(*adapter));
-}
-
+/// Each begins and ends a guard: by itself, on other threads, in another object.
 TEST_F(GuardRegistration, IsLostWithAnInnerGuardAndRegainedWithTheNext)
 {
+    const upath root = asPath(repository_.path());
+    const std::vector<std::pair<std::string, std::function<std::shared_ptr<void>()>>> guards{
+        {"guard", [] { return std::make_shared<LibGit2Guard>(); }},
+        {"adapter", [this] { return std::shared_ptr<GitAdapter>(newAdapter()); }},
+        {"configuration", [] { return std::make_shared<vclink::git::GitConfig>(); }},
+        {"generator", [this]
+         {
+             return std::shared_ptr<vclink::WorkingCopyGenerator>(
+                 GitAdapterFactory().createWorkingCopyGenerator(interactor_));
+         }}};
     const auto adapter = newAdapter();
+    for (const auto &[name, begin] : guards)
     {
-        const LibGit2Guard inner;
+        SCOPED_TRACE(name);
+        auto guard = begin();
+        EXPECT_TRUE(isRegistered());
         EXPECT_TRUE(runsTheCommand(*adapter));
-    }
-    EXPECT_FALSE(isRegistered());
-    EXPECT_FALSE(runsTheCommand(*adapter));
-    {
-        const LibGit2Guard next;
+        std::thread([&] { guard.reset(); }).join();
+        EXPECT_FALSE(isRegistered());
+        EXPECT_FALSE(runsTheCommand(*adapter));
+        std::thread([&, &start = begin] { guard = start(); }).join();
         EXPECT_TRUE(runsTheCommand(*adapter));
+        EXPECT_TRUE(GitAdapterFactory().isAdapterFor(root));
+        EXPECT_FALSE(runsTheCommand(*adapter)) << "a probe has a guard, too";
     }
-    EXPECT_FALSE(runsTheCommand(*adapter));
-}
-
-TEST_F(GuardRegistration, IsLostWithTheOuterGuardToo)
-{
-    std::optional<LibGit2Guard> outer(std::in_place);
-    const auto adapter = newAdapter();
-    EXPECT_TRUE(runsTheCommand(*adapter));
-    outer.reset();
-    EXPECT_FALSE(runsTheCommand(*adapter));
-}
-
-TEST_F(GuardRegistration, StandsAgainForGuardsOneAfterTheOther)
-{
-    for (int i = 0; i < 3; ++i)
-    {
-        const auto adapter = newAdapter();
-        EXPECT_TRUE(runsTheCommand(*adapter)) << i;
-    }
-    EXPECT_FALSE(isRegistered());
-}
-
-TEST_F(GuardRegistration, IsLostWithAProbeInTheMiddleOfAnAdaptersLife)
-{
-    const auto adapter = newAdapter();
-    EXPECT_TRUE(runsTheCommand(*adapter));
-    EXPECT_TRUE(GitAdapterFactory().isAdapterFor(asPath(repository_.path())));
-    EXPECT_FALSE(runsTheCommand(*adapter));
-    const auto second = newAdapter();
-    EXPECT_TRUE(runsTheCommand(*adapter));
-    EXPECT_TRUE(runsTheCommand(*second));
 }
 
 TEST_F(GuardRegistration, IsLostWithAProbeThatSaysNoOrFails)
@@ -161,63 +131,23 @@ TEST_F(GuardRegistration, IsLostWithAProbeThatSaysNoOrFails)
     EXPECT_FALSE(isRegistered());
 }
 
-TEST_F(GuardRegistration, IsLostWithASecondAdapter)
+TEST_F(GuardRegistration, StandsForTheLifeOfTheOnlyGuardAndServesMergesOnAnyThread)
 {
-    const auto adapter = newAdapter();
-    auto second = newAdapter();
-    EXPECT_TRUE(runsTheCommand(*second));
-    second.reset();
-    EXPECT_FALSE(runsTheCommand(*adapter));
-}
-
-TEST_F(GuardRegistration, IsLostWithAnObjectForTheConfiguration)
-{
-    const auto adapter = newAdapter();
+    EXPECT_FALSE(isRegistered());
+    for (int i = 0; i < 2; ++i)
     {
-        const vclink::git::GitConfig config;
+        const auto adapter = newAdapter();
         EXPECT_TRUE(runsTheCommand(*adapter));
-    }
-    EXPECT_FALSE(runsTheCommand(*adapter));
-}
-
-TEST_F(GuardRegistration, IsLostWithAGenerator)
-{
-    const auto adapter = newAdapter();
-    {
-        const auto generator = GitAdapterFactory().createWorkingCopyGenerator(interactor_);
-        EXPECT_TRUE(runsTheCommand(*adapter));
+        bool runs = false;
+        std::thread([&] { runs = runsTheCommand(*adapter); }).join();
+        EXPECT_TRUE(runs);
     }
     EXPECT_FALSE(isRegistered());
-    EXPECT_FALSE(runsTheCommand(*adapter));
-    const auto next = GitAdapterFactory().createWorkingCopyGenerator(interactor_);
-    EXPECT_TRUE(runsTheCommand(*adapter));
-}
-
-TEST_F(GuardRegistration, IsLostAndRegainedByGuardsOfAnotherThread)
-{
-    const auto adapter = newAdapter();
-    std::unique_ptr<LibGit2Guard> guard;
-    std::thread([&guard] { guard = std::make_unique<LibGit2Guard>(); }).join();
-    EXPECT_TRUE(runsTheCommand(*adapter));
-    std::thread([&guard] { guard.reset(); }).join();
-    EXPECT_FALSE(runsTheCommand(*adapter));
-    std::thread([&guard] { guard = std::make_unique<LibGit2Guard>(); }).join();
-    EXPECT_TRUE(runsTheCommand(*adapter));
-    guard.reset();
-    EXPECT_FALSE(runsTheCommand(*adapter));
-}
-
-TEST_F(GuardRegistration, ServesAMergeOnAnotherThread)
-{
-    const auto adapter = newAdapter();
-    bool runs = false;
-    std::thread([&] { runs = runsTheCommand(*adapter); }).join();
-    EXPECT_TRUE(runs);
 }
 
 TEST_F(GuardRegistration, EndsWithARecordAndBeginsWithout)
 {
-    vclink::test::LogCapture log;
+    LogCapture log;
     {
         const LibGit2Guard guard;
         EXPECT_THAT(log.messages(), testing::IsEmpty());

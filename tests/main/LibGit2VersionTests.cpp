@@ -1,7 +1,6 @@
 // SPDX-License-Identifier: MIT
 #include <cstdio>
 #include <string>
-#include <type_traits>
 
 #include <git2.h>
 #include <gmock/gmock.h>
@@ -46,14 +45,6 @@ TEST(LibGit2Version, NeedsNoGuardAndStartsNothing)
     EXPECT_NE(version.toString(), "");
     EXPECT_EQ(git_libgit2_init(), before);
     git_libgit2_shutdown();
-}
-
-TEST(LibGit2Version, IsAPlainValueOfThreeInts)
-{
-    EXPECT_EQ(sizeof(LibGit2Version), 3 * sizeof(int));
-    EXPECT_TRUE(std::is_trivially_copyable_v<LibGit2Version>);
-    EXPECT_TRUE((std::is_same_v<decltype(LibGit2Version().getMajor()), int>));
-    EXPECT_TRUE((std::is_same_v<decltype(LibGit2Version().toString()), std::string>));
 }
 
 TEST(LibGit2Features, AreTheFourBitsThatTheLinkedLibraryHas)

@@ -22,12 +22,11 @@ namespace
 
 namespace fs = std::filesystem;
 namespace git = vclink::git;
-using vclink::test::asPath;
-using vclink::test::asUtf16;
+using namespace vclink::test;
 
 /// Commands of git need a working folder, so what an operation has done is looked at once there is
 /// one again.
-class DeletedWorkingFolder : public vclink::test::RemoteFixture
+class DeletedWorkingFolder : public RemoteFixture
 {
   protected:
     upath pathOf(const std::string &name) const
@@ -36,7 +35,7 @@ class DeletedWorkingFolder : public vclink::test::RemoteFixture
     }
     template <class Action> void withoutFolder(const Action &action) const
     {
-        const vclink::test::NoWorkingFolder gone(folder().path());
+        const NoWorkingFolder gone(folder().path());
         action();
     }
 };

@@ -26,10 +26,7 @@ namespace
 
 namespace fs = std::filesystem;
 namespace git = vclink::git;
-using vclink::test::asPath;
-using vclink::test::asUtf16;
-using vclink::test::asUtf8;
-using vclink::test::NothingChanges;
+using namespace vclink::test;
 
 /// The text with a NUL behind it, and more behind that.
 std::string cutByNul(const std::string &text)
@@ -71,7 +68,7 @@ std::string nulRefusalOf(const std::string &text)
 }
 
 /// "main" is checked out, "topic" has a commit more; "file" is changed, "new" is untracked.
-class NulInTexts : public vclink::test::RemoteFixture
+class NulInTexts : public RemoteFixture
 {
   protected:
     NulInTexts()
@@ -272,7 +269,7 @@ TEST_F(NulInTexts, OfACloneAreRefusedAndNothingIsMade)
               nulRefusalOf(server));
     EXPECT_EQ(nulFailureOf([&] { generator.generate(asUtf16(server), asPath(cutByNul(target))); }),
               nulRefusalOf(target));
-    auto factory = std::make_unique<vclink::test::TestOptionsFactory>(interactor_);
+    auto factory = std::make_unique<TestOptionsFactory>(interactor_);
     factory->cloneOptions.checkoutBranch = cutByNul("main");
     git::GitWorkingCopyGenerator choosing(std::move(factory));
     EXPECT_EQ(nulFailureOf([&] { choosing.generate(asUtf16(server), asPath(target)); }),

@@ -13,11 +13,10 @@ namespace
 {
 
 using testing::HasSubstr;
-using vclink::test::Command;
-using vclink::test::CommandResult;
+using namespace vclink::test;
 
 /// A host whose objects are static, run in a working copy.
-class StaticHost : public vclink::test::GitFixture
+class StaticHost : public GitFixture
 {
   protected:
     static constexpr const char *recordOfAnEnd = "Unregister merge driver: *";
@@ -48,7 +47,7 @@ class StaticHost : public vclink::test::GitFixture
         EXPECT_EQ(countEnds(result.output), 4) << result.output;
     }
 
-    vclink::test::GitRepository repository_ = makeRepository();
+    GitRepository repository_ = makeRepository();
 };
 
 TEST_F(StaticHost, EndsCleanlyWithWhatItNeverUsed)
