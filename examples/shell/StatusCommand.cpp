@@ -63,7 +63,7 @@ FileStateMap collectStates(CMAdapter &adapter, const std::vector<std::string> &a
         }
         states.merge(named.states);
     }
-    FileStateMap single = adapter.getFileStates(files);
+    FileStateMap single = statesOf(adapter, files);
     if (single.empty())
     {
         refuseUnknownStates(adapter);

@@ -84,7 +84,42 @@ NamedPath lookUpLink(CMAdapter &adapter, const std::string &argument, const upat
     return {argument, entry, std::move(states), isFolder, true};
 }
 
+/// With a rename in the index, the states depend on which of its two names are asked for.
+bool isPlain(const FileStateMap &states)
+{
+    return !states.empty() && std::none_of(states.begin(), states.end(),
+                                           [](const auto &entry) {
+                                               return entry.second.getState() == FileState::Unknown;
+                                           });
+}
+
 } // namespace
+
+FileStateMap statesOf(CMAdapter &adapter, const std::vector<upath> &files)
+{
+    constexpr std::size_t mostNames = 10;
+    if (files.size() <= mostNames)
+    {
+        return adapter.getFileStates(files);
+    }
+    const FileStateMap all = adapter.getFolderStates(adapter.getRootFolder());
+    FileStateMap states;
+    std::vector<upath> others;
+    for (const upath &file : files)
+    {
+        FileStateMap found = pick(all, file);
+        if (isPlain(found))
+        {
+            states.merge(found);
+        }
+        else
+        {
+            others.push_back(file);
+        }
+    }
+    states.merge(adapter.getFileStates(others));
+    return states;
+}
 
 std::vector<NamedPath> lookUpFolders(CMAdapter &adapter, const std::vector<std::string> &arguments)
 {
@@ -112,7 +147,7 @@ std::vector<NamedPath> lookUp(CMAdapter &adapter, const std::vector<std::string>
         paths.push_back(isLink ? lookUpLink(adapter, argument, entry)
                                : lookUpFolder(adapter, argument, nativePath(entry)));
     }
-    const FileStateMap states = adapter.getFileStates(entries);
+    const FileStateMap states = statesOf(adapter, entries);
     for (NamedPath &named : paths)
     {
         if (!named.isLink)

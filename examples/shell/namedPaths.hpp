@@ -38,6 +38,10 @@ std::vector<NamedPath> lookUpFolders(CMAdapter &adapter, const std::vector<std::
 /// @throws ShellFailure also if the states of files can't be known
 std::vector<NamedPath> lookUp(CMAdapter &adapter, const std::vector<std::string> &arguments);
 
+/// The states of these files. Many names are looked up in the states of the whole working copy: the
+/// back end compares each name with each file, which takes longer.
+FileStateMap statesOf(CMAdapter &adapter, const std::vector<upath> &files);
+
 /// Whether a path is that of the folder or lies below it; both free of symbolic links.
 bool liesIn(const ustring &path, const ustring &folder);
 

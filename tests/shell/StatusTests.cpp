@@ -244,6 +244,44 @@ TEST_F(ShellStatus, NamesCanBePastedIntoTheNextCommand)
     }
 }
 
+/// More than ten are looked up in the states of the whole working copy.
+TEST_F(ShellStatus, ShowsManyNamesAsEachByItself)
+{
+    GitRepository repository = makeRepository();
+    std::vector<std::string> names{"new", "before", "gone", "unversioned"};
+    for (int number = 0; number < 10; ++number)
+    {
+        names.push_back("file" + std::to_string(number));
+        repository.write(names.back(), "");
+    }
+    repository.write("gone/a", "");
+    repository.write("gone/b", "");
+    repository.write("old", "a text that is long enough to be found again\n");
+    repository.write("before", "another text, which is long enough as well\n");
+    repository.commitAll("begin");
+    repository.git({"mv", "old", "new"});
+    repository.git({"mv", "before", "after"});
+    repository.remove("gone");
+    repository.write("file0", "changed");
+    repository.remove("file1");
+    repository.git({"rm", "--quiet", "file2"});
+    repository.write("unversioned", "");
+    Records each;
+    for (const auto &name : names)
+    {
+        const auto one = statesIn(repository.path(), {name});
+        each.insert(each.end(), one.begin(), one.end());
+    }
+    ASSERT_EQ(each.size(), names.size() + 1);
+    EXPECT_THAT(statesIn(repository.path(), names), testing::UnorderedElementsAreArray(each));
+    names.emplace_back("nothing");
+    names.insert(names.begin(), "status");
+    const CommandResult refused = runIn(repository.path(), names);
+    EXPECT_EQ(refused.exitStatus, 1);
+    EXPECT_EQ(refused.errors, "vclink-shell: Not every name is known:\n"
+                              "  nothing: there is no such file\n");
+}
+
 TEST_F(ShellStatus, FailsForNamesThatNoFileHas)
 {
     const GitRepository repository = makeRepository();
