@@ -149,11 +149,11 @@ std::vector<DriverCase> sideCases()
     const Change base = writes("file", lines("base"));
     const Change ours = writes("file", lines("ours"));
     const Change theirs = writes("file", lines("theirs"));
+    const Change movedByOurs = both(moves("file", "new"), writes("new", lines("ours")));
+    const Change movedByTheirs = both(moves("file", "new"), writes("new", lines("theirs")));
     return {
-        sides("MovedByOurs", base, both(moves("file", "new"), writes("new", lines("ours"))),
-              theirs),
-        sides("MovedByTheirs", base, ours,
-              both(moves("file", "new"), writes("new", lines("theirs")))),
+        sides("MovedByOurs", base, movedByOurs, theirs),
+        sides("MovedByTheirs", base, ours, movedByTheirs),
         sides("MovedByOursIntoAFolder", base,
               both(both([](const GitRepository &repository) { repository.makeFolder("sub"); },
                         moves("file", "sub/file")),
@@ -169,11 +169,8 @@ std::vector<DriverCase> sideCases()
               both(theirs, sets("file", 0755))),
         sides("NoLongerExecutableByOurs", both(base, sets("file", 0755)),
               both(ours, sets("file", 0644)), theirs),
-        sides("MovedByOursExecutableByTheirs", base,
-              both(moves("file", "new"), writes("new", lines("ours"))),
-              both(theirs, sets("file", 0755))),
-        sides("ExecutableByOursMovedByTheirs", base, both(ours, sets("file", 0755)),
-              both(moves("file", "new"), writes("new", lines("theirs")))),
+        sides("MovedByOursExecutableByTheirs", base, movedByOurs, both(theirs, sets("file", 0755))),
+        sides("ExecutableByOursMovedByTheirs", base, both(ours, sets("file", 0755)), movedByTheirs),
         sides("RemovedByOurs", base, removes("file"), theirs),
         sides("RemovedByTheirs", base, ours, removes("file")),
         // git gives the command an empty ancestor.

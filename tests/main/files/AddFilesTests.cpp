@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: MIT
 #include <filesystem>
+#include <ostream>
 #include <string>
 #include <vector>
 
@@ -8,6 +9,7 @@
 #include <gtest/gtest.h>
 
 #include "StagingFixture.hpp"
+#include "runScript.hpp"
 
 namespace
 {
@@ -40,15 +42,57 @@ TEST_F(AddFiles, BeginsToTrackANewFile)
     EXPECT_EQ(states(repository_, {"new"}), (States{{"new", "Added"}}));
 }
 
-TEST_F(AddFiles, LeavesTheRepositoryAsGitWould)
+/// What is done in a script of the shell, what is added as `git add` does, and how the index's
+/// entry of the first of these begins.
+struct AdditionCase
 {
-    repository_.write("new", "x");
-    repository_.write("sub/deep/new", "y");
-    repository_.write("left", "z");
-    const RepositoryState expected = stateAfterGit({{"add", "new", "sub/deep/new"}});
-    add({"sub/deep/new", "new"});
-    EXPECT_EQ(stateOf(repository_), expected);
+    const char *sentence;
+    const char *script;
+    std::vector<std::string> names;
+    const char *entry;
+};
+
+void PrintTo(const AdditionCase &row, std::ostream *stream)
+{
+    *stream << row.script;
 }
+
+class AddAsGit : public AddFiles, public testing::WithParamInterface<AdditionCase>
+{
+};
+
+TEST_P(AddAsGit, Adds)
+{
+    const std::vector<std::string> &names = GetParam().names;
+    vclink::test::runScript(repository_, GetParam().script);
+    std::vector<std::string> command{"add", "--"};
+    command.insert(command.end(), names.begin(), names.end());
+    const RepositoryState expected = stateAfterGit({command});
+    add(names);
+    EXPECT_EQ(stateOf(repository_), expected);
+    EXPECT_THAT(indexOf(repository_).at(names.front()), testing::StartsWith(GetParam().entry));
+}
+
+const AdditionCase additionCases[] = {
+    {"NewFilesAndNoOthers",
+     "mkdir sub/deep; echo x | tee new sub/deep/new >left",
+     {"sub/deep/new", "new"},
+     "H 100644"},
+    {"AnExecutable", "echo x >tool; chmod 755 tool", {"tool"}, "H 100755"},
+    {"AnExecutableWhoseBitDoesNotCount",
+     "git config core.fileMode false; echo x >tool; chmod 755 tool",
+     {"tool"},
+     "H 100644"},
+    {"LineEndsAsTheAttributesSay",
+     "printf '*.txt text eol=crlf\\n*.bin -text\\nauto text=auto\\n' >.gitattributes; "
+     "printf 'one\\r\\ntwo\\r\\n' | tee a.txt a.bin >auto",
+     {"a.txt", "a.bin", "auto"},
+     "H 100644"},
+    {"ALinkThatLeadsNowhere", "ln -s nowhere link", {"link"}, "H 120000"},
+};
+
+INSTANTIATE_TEST_SUITE_P(It, AddAsGit, testing::ValuesIn(additionCases),
+                         [](const auto &row) { return row.param.sentence; });
 
 TEST_F(AddFiles, WorksInARepositoryWithoutACommit)
 {
@@ -79,14 +123,10 @@ TEST_F(AddFiles, WorksBelowARootThatIsReachedThroughALink)
     EXPECT_THAT(status(), ElementsAre("A  sub/new", "?? left"));
 }
 
-TEST_F(AddFiles, DoesNothingForAnEmptyList)
+TEST_F(AddFiles, DoesNothingForAnEmptyListAndOpensNothing)
 {
     const NothingChanges nothing(repository_);
     add({});
-}
-
-TEST_F(AddFiles, OpensNothingForAnEmptyList)
-{
     EXPECT_NO_THROW(makeAdapter(folder() / "missing")->addFiles({}));
 }
 
@@ -170,7 +210,7 @@ TEST_F(AddFiles, RefusesWithTheCataloguesText)
     }
 }
 
-TEST_F(AddFiles, PassesOverAnIgnoredFile)
+TEST_F(AddFiles, PassesOverIgnoredFilesAndNamesThatDoNotExist)
 {
     repository_.write(".git/info/exclude", "*.o\n");
     repository_.write("a.o", "x");
@@ -178,19 +218,9 @@ TEST_F(AddFiles, PassesOverAnIgnoredFile)
     {
         const NothingChanges nothing(repository_);
         add({"a.o"});
-    }
-    add({"a.o", "new"});
-    EXPECT_THAT(status(), ElementsAre("A  new"));
-}
-
-TEST_F(AddFiles, PassesOverANameThatDoesNotExist)
-{
-    repository_.write("new", "x");
-    {
-        const NothingChanges nothing(repository_);
         add({"missing", "missing/below", "file/below"});
     }
-    add({"missing", "new"});
+    add({"a.o", "missing", "new"});
     EXPECT_THAT(status(), ElementsAre("A  new"));
 }
 
@@ -247,38 +277,6 @@ TEST_F(AddFiles, TakesAFolderWithADangerousNameForItsOwnEntry)
     EXPECT_THAT(status(), ElementsAre("A  #dir/a", "A  dir /a", "?? !dir/a"));
 }
 
-TEST_F(AddFiles, KeepsTheExecutableBit)
-{
-    repository_.write("tool", "x");
-    repository_.setMode("tool", 0755);
-    const RepositoryState expected = stateAfterGit({{"add", "tool"}});
-    add({"tool"});
-    EXPECT_EQ(stateOf(repository_), expected);
-    EXPECT_EQ(indexOf(repository_).at("tool").substr(0, 8), "H 100755");
-}
-
-TEST_F(AddFiles, DropsAnExecutableBitThatDoesNotCount)
-{
-    repository_.git({"config", "core.fileMode", "false"});
-    repository_.write("tool", "x");
-    repository_.setMode("tool", 0755);
-    add({"tool"});
-    EXPECT_EQ(indexOf(repository_).at("tool").substr(0, 8), "H 100644");
-}
-
-TEST_F(AddFiles, ConvertsLineEndsAsTheAttributesSay)
-{
-    repository_.write(".gitattributes", "*.txt text eol=crlf\n*.bin -text\nauto text=auto\n");
-    repository_.write("a.txt", "one\r\ntwo\r\n");
-    repository_.write("a.bin", "one\r\ntwo\r\n");
-    repository_.write("auto", "one\r\ntwo\r\n");
-    const RepositoryState expected = stateAfterGit({{"add", "a.txt", "a.bin", "auto"}});
-    add({"a.txt", "a.bin", "auto"});
-    EXPECT_EQ(stateOf(repository_), expected);
-    EXPECT_EQ(repository_.git({"show", ":a.txt"}), "one\ntwo\n");
-    EXPECT_EQ(repository_.git({"show", ":a.bin"}), "one\r\ntwo\r\n");
-}
-
 TEST_F(AddFiles, TakesALinkForItsTarget)
 {
     repository_.write("target", "x");
@@ -288,15 +286,6 @@ TEST_F(AddFiles, TakesALinkForItsTarget)
     EXPECT_THAT(status(), ElementsAre("A  target", "?? known", "?? link"));
     const NothingChanges nothing(repository_);
     expectRefuses({"file"}, {"known"});
-}
-
-TEST_F(AddFiles, TakesALinkThatLeadsNowhereForItself)
-{
-    repository_.symlink("nowhere", "link");
-    const RepositoryState expected = stateAfterGit({{"add", "link"}});
-    add({"link"});
-    EXPECT_EQ(stateOf(repository_), expected);
-    EXPECT_EQ(indexOf(repository_).at("link").substr(0, 8), "H 120000");
 }
 
 /// The files that the folder stands for are looked up by name once more.
