@@ -11,6 +11,7 @@
 #include "error/errorUtil/GitResult.hpp"
 #include "error/errorUtil/callbackException.hpp"
 #include "error/errorUtil/libgit2Errors.hpp"
+#include "main/checkout/MergeBases.hpp"
 #include "main/checkout/conflictLocks.hpp"
 #include "main/checkout/gitlinks.hpp"
 #include "main/checkout/obstaclesAhead.hpp"
@@ -50,43 +51,6 @@ Finding ask(const Rules &rules, WorkingCopy &copy, const Subject &subject)
     }
     return {};
 }
-
-/// Owns the result of git_merge_bases.
-class MergeBases
-{
-  public:
-    /// Has none for unrelated histories.
-    MergeBases(git_repository *repository, const git_oid *ours, const git_oid *theirs)
-        // Delegates, so that the destructor releases what a failing call has left.
-        : MergeBases()
-    {
-        const GitResult<void> found = call(git_merge_bases, &array_, repository, ours, theirs);
-        if (!found.has_error() || found.error().getCode() != GIT_ENOTFOUND)
-        {
-            found.value();
-        }
-    }
-    MergeBases(const MergeBases &) = delete;
-    MergeBases &operator=(const MergeBases &) = delete;
-    ~MergeBases()
-    {
-        git_oidarray_dispose(&array_);
-    }
-
-    std::size_t size() const
-    {
-        return array_.count;
-    }
-    const git_oid *at(std::size_t index) const
-    {
-        return &array_.ids[index];
-    }
-
-  private:
-    MergeBases() = default;
-
-    git_oidarray array_{};
-};
 
 OwnedHandle<git_tree> treeOf(git_repository *repository, const git_oid *commitId)
 {
@@ -188,6 +152,7 @@ void CheckoutWatch::lookBeforeMerge(const git_oid *theirs)
         const OwnedHandle<git_tree> before =
             bases.size() != 0 ? treeOf(repository_, bases.at(i)) : nullptr;
         Finding found;
+        RenamedLocks renamed;
         visitTreeChanges(repository_, before.get(), after.get(),
                          [&](const TreeChange &change)
                          {
@@ -196,11 +161,16 @@ void CheckoutWatch::lookBeforeMerge(const git_oid *theirs)
                              {
                                  found = findLockOfConflict(repository_, copy, change, after.get());
                              }
+                             renamed.note(copy, change);
                              merged_.noteChange(copy, change);
                              yielding = firstOf(yielding, findYielding(copy, change));
                              mayBeRenamed = mayBeRenamed || isDeletedByBoth(copy, change);
                              return !found;
                          });
+        if (!found)
+        {
+            found = renamed.find(repository_, copy, before.get(), after.get());
+        }
         first = firstOf(first, found);
     }
     if (mayBeRenamed)

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "main/checkout/conflictLocks.hpp"
 
+#include <algorithm>
 #include <memory>
 #include <string>
 
@@ -57,6 +58,14 @@ bool hasCommand(git_repository *repository, const std::string &path)
 }
 
 /// Returns true if the lines conflict.
+bool isConflict(git_repository *repository, const git_index_entry *before,
+                const git_index_entry &ours, const git_index_entry &theirs)
+{
+    MergedFile merged;
+    check(git_merge_file_from_index, merged.get(), repository, before, &ours, &theirs, nullptr);
+    return merged.get()->automergeable == 0;
+}
+
 bool isConflict(git_repository *repository, const git_index_entry &ours, const TreeChange &change)
 {
     const git_index_entry theirs = entryOf(change.path, change.after);
@@ -65,10 +74,7 @@ bool isConflict(git_repository *repository, const git_index_entry &ours, const T
     {
         before = entryOf(change.path, change.before);
     }
-    MergedFile merged;
-    check(git_merge_file_from_index, merged.get(), repository,
-          change.before != nullptr ? &before : nullptr, &ours, &theirs, nullptr);
-    return merged.get()->automergeable == 0;
+    return isConflict(repository, change.before != nullptr ? &before : nullptr, ours, theirs);
 }
 
 bool isInTree(const git_tree *tree, const std::string &path)
@@ -92,6 +98,12 @@ bool isThere(WorkingCopy &copy, const std::string &path, const git_tree *theirs)
            isInTree(theirs, path);
 }
 
+Obstacle besideLock(const std::string &path)
+{
+    return {path, "the conflict in '" + path + "' cannot be written beside '" + path +
+                      ".lock': merge with 'git merge'"};
+}
+
 } // namespace
 
 Finding findLockOfConflict(git_repository *repository, WorkingCopy &copy, const TreeChange &change,
@@ -110,9 +122,79 @@ Finding findLockOfConflict(git_repository *repository, WorkingCopy &copy, const 
     {
         return {};
     }
-    return Obstacle{change.path, "the conflict in '" + change.path +
-                                     "' cannot be written beside '" + lock +
-                                     "': merge with 'git merge'"};
+    return besideLock(change.path);
+}
+
+void RenamedLocks::note(WorkingCopy &copy, const TreeChange &change)
+{
+    if (change.before == nullptr || isGitlink(change.before) || isGitlink(change.after))
+    {
+        return;
+    }
+    const auto fileOf = [&change](const git_tree_entry *side) {
+        return File{change.path, *git_tree_entry_id(side), git_tree_entry_filemode(side)};
+    };
+    const git_index_entry *const ours = copy.entryOf(change.path);
+    if (ours == nullptr && change.after != nullptr)
+    {
+        deletedByOurs_.push_back({fileOf(change.before), fileOf(change.after)});
+    }
+    else if (ours != nullptr && change.after == nullptr && !isOf(*ours, change.before))
+    {
+        const auto mode = static_cast<git_filemode_t>(ours->mode);
+        deletedByTheirs_.push_back({fileOf(change.before), {change.path, ours->id, mode}});
+    }
+}
+
+Finding RenamedLocks::find(git_repository *repository, WorkingCopy &copy, const git_tree *before,
+                           const git_tree *theirs) const
+{
+    Finding found = findIn(repository, copy, before, copy.head(), theirs, deletedByOurs_);
+    return found ? found : findIn(repository, copy, before, theirs, theirs, deletedByTheirs_);
+}
+
+Finding RenamedLocks::findIn(git_repository *repository, WorkingCopy &copy, const git_tree *before,
+                             const git_tree *renaming, const git_tree *theirs,
+                             const std::vector<Candidate> &candidates)
+{
+    Finding found;
+    if (candidates.empty())
+    {
+        return found;
+    }
+    const auto entryFor = [](const File &file)
+    {
+        git_index_entry entry{};
+        entry.path = file.path.c_str();
+        entry.mode = file.mode;
+        entry.id = file.id;
+        return entry;
+    };
+    const auto isInConflict = [&](const TreeChange &change)
+    {
+        const git_index_entry renamed = entryOf(change.path, change.after);
+        return std::any_of(candidates.begin(), candidates.end(),
+                           [&](const Candidate &candidate)
+                           {
+                               const git_index_entry base = entryFor(candidate.before);
+                               const git_index_entry changed = entryFor(candidate.changed);
+                               return isConflict(repository, &base, renamed, changed);
+                           });
+    };
+    visitTreeChanges(repository, before, renaming,
+                     [&](const TreeChange &change)
+                     {
+                         const bool isAdded = change.before == nullptr && change.after != nullptr &&
+                                              !isGitlink(change.after);
+                         const std::string lock = change.path + ".lock";
+                         if (isAdded && isThere(copy, lock, theirs) &&
+                             (hasCommand(repository, change.path) || isInConflict(change)))
+                         {
+                             found = besideLock(change.path);
+                         }
+                         return !found;
+                     });
+    return found;
 }
 
 } // namespace vclink::git

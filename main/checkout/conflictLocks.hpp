@@ -1,6 +1,11 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include <string>
+#include <vector>
+
+#include <git2/oid.h>
+#include <git2/tree.h>
 #include <git2/types.h>
 
 #include "main/checkout/Obstacle.hpp"
@@ -12,10 +17,44 @@ namespace vclink::git
 
 /// A rule of a merge: finds a name that is the name of a file in conflict with ".lock" appended,
 /// e.g. "Gemfile.lock". libgit2 uses this name for its temporary file while it writes the conflict,
-/// and would fail in the middle of its writing. Does not examine files that only a rename combines.
+/// and would fail in the middle of its writing. For files that a rename combines, see RenamedLocks.
 /// @param theirs the other side's tree, which can add such a name
 /// @throws LibGit2Exception
 Finding findLockOfConflict(git_repository *repository, WorkingCopy &copy, const TreeChange &change,
                            const git_tree *theirs);
+
+/// The same rule for a file that one side has renamed and the other has changed.
+class RenamedLocks
+{
+  public:
+    /// Notes a file that may have been renamed: one side has deleted it, the other has changed it.
+    void note(WorkingCopy &copy, const TreeChange &change);
+
+    /// Compares each noted file with the files that the other side has added beside such a name.
+    /// Reads the trees only if there is anything noted.
+    /// @param before the tree of a merge base, null for the empty tree
+    /// @throws LibGit2Exception
+    Finding find(git_repository *repository, WorkingCopy &copy, const git_tree *before,
+                 const git_tree *theirs) const;
+
+  private:
+    struct File
+    {
+        std::string path;
+        git_oid id;
+        git_filemode_t mode;
+    };
+    struct Candidate
+    {
+        File before;
+        File changed;
+    };
+    static Finding findIn(git_repository *repository, WorkingCopy &copy, const git_tree *before,
+                          const git_tree *renaming, const git_tree *theirs,
+                          const std::vector<Candidate> &candidates);
+
+    std::vector<Candidate> deletedByOurs_;
+    std::vector<Candidate> deletedByTheirs_;
+};
 
 } // namespace vclink::git

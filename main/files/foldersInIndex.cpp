@@ -32,8 +32,8 @@ bool mayMeanFileOnly(const PathspecArray &pathspec)
                        { return pattern.find_first_of("*?[") != std::string_view::npos; });
 }
 
-/// In the order of the index, "a-1" may come between "a" and "a/1".
-std::vector<std::string> findFilesAboveOthers(git_index *index)
+/// In the order of the index, "a-1" may be between "a" and "a/1".
+std::vector<std::string> findBelowFiles(git_index *index)
 {
     std::vector<std::string> found;
     std::vector<std::string_view> files;
@@ -41,22 +41,23 @@ std::vector<std::string> findFilesAboveOthers(git_index *index)
     for (std::size_t i = 0; i < count; ++i)
     {
         const git_index_entry *const entry = git_index_get_byindex(index, i);
+        if (GIT_INDEX_ENTRY_STAGE(entry) != GIT_INDEX_STAGE_NORMAL)
+        {
+            continue;
+        }
         const std::string_view path = entry->path;
         while (!files.empty() && path.compare(0, files.back().size(), files.back()) != 0)
         {
             files.pop_back();
         }
-        const auto above =
-            std::find_if(files.begin(), files.end(),
-                         [path](std::string_view file) { return isBelow(path, file); });
-        if (above != files.end())
+        const bool isBelowFile =
+            std::any_of(files.begin(), files.end(),
+                        [path](std::string_view file) { return isBelow(path, file); });
+        if (isBelowFile)
         {
-            if (found.empty() || found.back() != *above)
-            {
-                found.emplace_back(*above);
-            }
+            found.emplace_back(path);
         }
-        else if (GIT_INDEX_ENTRY_STAGE(entry) == GIT_INDEX_STAGE_NORMAL)
+        else
         {
             files.push_back(path);
         }
@@ -72,12 +73,12 @@ bool takeOutBelowFiles(git_index *index, const PathspecArray &pathspec)
     {
         return false;
     }
-    const std::vector<std::string> files = findFilesAboveOthers(index);
-    for (const std::string &file : files)
+    const std::vector<std::string> paths = findBelowFiles(index);
+    for (const std::string &path : paths)
     {
-        check(git_index_remove_directory, index, file.c_str(), GIT_INDEX_STAGE_NORMAL);
+        check(git_index_remove, index, path.c_str(), GIT_INDEX_STAGE_NORMAL);
     }
-    return !files.empty();
+    return !paths.empty();
 }
 
 } // namespace vclink::git

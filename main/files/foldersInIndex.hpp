@@ -8,12 +8,11 @@ namespace vclink::git
 
 class PathspecArray;
 
-/// Takes out of the index, in memory, what is below a file of it: the index cannot hold both, and
-/// git could not commit it. libgit2 itself forgets what is below a file that it adds, unless the
-/// file's pattern means that, too; a pattern with a wildcard or an escape may not.
-/// git_index_remove_directory.
+/// Removes from the index, in memory, what is below a file of the index. git cannot commit an index
+/// with both. libgit2 leaves it there when it adds the file, unless the file's pattern also matches
+/// it; a pattern with a wildcard or an escape may not. git_index_remove.
 /// @param pathspec the patterns whose files were added
-/// @return whether there was anything
+/// @return true if there was anything to remove
 /// @throws LibGit2Exception
 bool takeOutBelowFiles(git_index *index, const PathspecArray &pathspec);
 

@@ -6,6 +6,7 @@
 #include <cstdint>
 #include <ctime>
 #include <string>
+#include <tuple>
 
 #include <fcntl.h>
 #include <git2/errors.h>
@@ -96,6 +97,11 @@ bool isOfTime(const git_index_entry &entry, const timespec &time)
            entry.mtime.nanoseconds == static_cast<std::uint32_t>(time.tv_nsec);
 }
 
+bool isBefore(const timespec &left, const timespec &right)
+{
+    return std::tie(left.tv_sec, left.tv_nsec) < std::tie(right.tv_sec, right.tv_nsec);
+}
+
 void restoreDropped(git_repository *repository, git_index *index, git_index *before)
 {
     const std::string workdir = git_repository_workdir(repository);
@@ -134,10 +140,12 @@ void refreshIndex(git_repository *repository, git_index *index)
 
 void markSavedSince(git_repository *repository, git_index *index)
 {
+    const char *const indexPath = git_index_path(index);
+    // The copy of the index was made when it was locked, by the clock of its file system.
     struct stat ofIndex = {};
-    if (stat(git_index_path(index), &ofIndex) != 0)
+    if (stat(indexPath, &ofIndex) != 0)
     {
-        return;
+        raiseSystemError(errno, std::string("could not read the index '") + indexPath + "'");
     }
     std::string path = git_repository_workdir(repository);
     const std::size_t rootSize = path.size();
@@ -152,7 +160,10 @@ void markSavedSince(git_repository *repository, git_index *index)
         }
         path.replace(rootSize, std::string::npos, entry->path);
         struct stat ofFile = {};
-        if (lstat(path.c_str(), &ofFile) == 0 && !isOfTime(*entry, ofFile.st_mtim))
+        const bool isSaved = lstat(path.c_str(), &ofFile) == 0 &&
+                             !isBefore(ofFile.st_ctim, ofIndex.st_ctim) &&
+                             !isOfTime(*entry, ofFile.st_mtim);
+        if (isSaved)
         {
             // As git and libgit2 mark a file to be compared by its content.
             git_index_entry marked = *entry;

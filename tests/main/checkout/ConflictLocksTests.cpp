@@ -28,10 +28,10 @@ class ConflictLocks : public vclink::test::ObstacleFixture
                     also();
                 });
     }
-    void expectRefused() const
+    void expectRefused(const std::string &name = "file") const
     {
-        expectMergeRefused(refusal("the conflict in 'file' cannot be written beside 'file.lock': "
-                                   "merge with 'git merge'"));
+        expectMergeRefused(refusal("the conflict in '" + name + "' cannot be written beside '" +
+                                   name + ".lock': merge with 'git merge'"));
     }
     void commitLock()
     {
@@ -97,6 +97,57 @@ TEST_F(ConflictLocks, RefuseTheMergeOfAFileWhoseCommandMayGiveUp)
     repository_.commitAll("lock");
     diverge(writing("file", "ours\n2\n3\n4\n5\n"), writing("file", "1\n2\n3\n4\ntheirs\n"));
     expectRefused();
+}
+
+/// Either side renames a file that the other has changed.
+TEST_F(ConflictLocks, RefuseTheMergeOfAFileThatOursHasRenamed)
+{
+    const std::string text = "1\n2\n3\n4\n5\n6\n7\n8\n";
+    repository_.write("old", text);
+    repository_.commitAll("old");
+    diverge(
+        [&]
+        {
+            repository_.remove("old");
+            repository_.write("renamed", "ours\n" + text);
+        },
+        writing("old", "theirs\n" + text));
+    repository_.write("renamed.lock", "mine\n");
+    expectRefused("renamed");
+    repository_.remove("renamed.lock");
+    expectConflicts("topic");
+}
+
+TEST_F(ConflictLocks, RefuseTheMergeOfAFileThatTheirsHasRenamed)
+{
+    const std::string text = "1\n2\n3\n4\n5\n6\n7\n8\n";
+    repository_.write("old", text);
+    repository_.commitAll("old");
+    diverge(writing("old", "ours\n" + text),
+            [&]
+            {
+                repository_.remove("old");
+                repository_.write("renamed", "theirs\n" + text);
+                repository_.write("renamed.lock", "x");
+            });
+    expectRefused("renamed");
+}
+
+TEST_F(ConflictLocks, AreInNobodysWayIfARenamedFileMergesCleanly)
+{
+    const std::string text = "1\n2\n3\n4\n5\n6\n7\n8\n";
+    repository_.write("old", text);
+    repository_.commitAll("old");
+    diverge(
+        [&]
+        {
+            repository_.remove("old");
+            repository_.write("new/file", "ours\n" + text);
+            repository_.write("new/file.lock", "x");
+        },
+        writing("old", text + "theirs\n"));
+    expectCleanAsGit();
+    EXPECT_EQ(repository_.read("new/file"), "ours\n" + text + "theirs\n");
 }
 
 TEST_F(ConflictLocks, AreInNobodysWayWithoutAConflict)
