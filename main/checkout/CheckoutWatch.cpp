@@ -25,14 +25,24 @@ namespace
 using ChangeRule = Finding (*)(WorkingCopy &, const TreeChange &);
 using NoticeRule = Finding (*)(WorkingCopy &, const CheckoutNotice &);
 
-constexpr std::array<ChangeRule, 10> switchRules{
-    findBlockedWay,           findSpecialFile,         findIgnoredLink,      findForeignInFolder,
-    findMissingFolder,        findSubmodule,           findFileForSubmodule, findFolderOfOtherUse,
-    findFolderForDeletedFile, findStagedBelowSubmodule};
-constexpr std::array<ChangeRule, 2> stagedRules{findStagedSubmodule, findStagedContent};
-constexpr std::array<ChangeRule, 6> mergeRules{findBlockedWayOfMerge,    findUntracked,
+constexpr std::array<ChangeRule, 12> switchRules{findBlockedWay,
+                                                 findSpecialFile,
+                                                 findIgnoredLink,
+                                                 findForeignInFolder,
+                                                 findMissingFolder,
+                                                 findSubmodule,
+                                                 findFileForSubmodule,
+                                                 findFolderOfOtherUse,
+                                                 findFolderForDeletedFile,
+                                                 findStagedBelowSubmodule,
+                                                 findMissingFileOfOtherKind,
+                                                 findUnwritableFolder};
+constexpr std::array<ChangeRule, 3> stagedRules{findStagedSubmodule, findStagedDeletion,
+                                                findStagedContent};
+constexpr std::array<ChangeRule, 8> mergeRules{findBlockedWayOfMerge,    findUntracked,
                                                findFileForSubmodule,     findSubmodule,
-                                               findFolderForDeletedFile, findSubmoduleAfterSibling};
+                                               findFolderForDeletedFile, findSubmoduleAfterSibling,
+                                               findUntrackedOfHead,      findUnwritableFolder};
 constexpr std::array<NoticeRule, 2> switchNoticeRules{findUnseen, findMissingFile};
 constexpr std::array<NoticeRule, 7> mergeNoticeRules{
     findEdit,          findUnseen,           findUntrackedNoticed, findForeignInFolderNoticed,
@@ -98,7 +108,7 @@ WorkingCopy &CheckoutWatch::lookAtWorkingCopy()
 {
     WorkingCopy &copy = copy_.emplace(repository_);
     // Otherwise libgit2 reads HEAD again. Without an index it must: that is a first checkout.
-    if (standingAt(git_index_path(copy.index())) != Standing::Nothing)
+    if (copy.hasIndex())
     {
         record_.baseline = copy.head();
     }

@@ -23,6 +23,7 @@ bool isInConflict(git_index *index, const std::string &path)
 
 void MergeSubmodules::noteChange(WorkingCopy &copy, const TreeChange &change)
 {
+    copy.readModulesFor(change);
     // A submodule that we removed and they moved is in conflict.
     const bool isComing = isGitlink(change.after) && change.before == nullptr &&
                           copy.entryOf(change.path) == nullptr &&

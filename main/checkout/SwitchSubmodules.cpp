@@ -9,20 +9,10 @@
 
 namespace vclink::git
 {
-namespace
-{
-
-/// libgit2 treats the first checkout of a repository, which has no index yet, as a checkout into an
-/// empty working tree.
-bool isFirstCheckout(const WorkingCopy &copy)
-{
-    return standingAt(git_index_path(copy.index())) == Standing::Nothing;
-}
-
-} // namespace
 
 bool SwitchSubmodules::note(WorkingCopy &copy, const TreeChange &change)
 {
+    copy.readModulesFor(change);
     const bool wasSubmodule = isGitlink(change.before);
     if (wasSubmodule == isGitlink(change.after))
     {
@@ -63,7 +53,7 @@ bool SwitchSubmodules::isEmpty() const noexcept
 OwnedHandle<git_index> SwitchSubmodules::makeBaseline(const WorkingCopy &copy) const
 {
     OwnedHandle<git_index> baseline = acquire<git_index>(git_index_new).value();
-    if (copy.head() != nullptr && !isFirstCheckout(copy))
+    if (copy.head() != nullptr && copy.hasIndex())
     {
         check(git_index_read_tree, baseline.get(), copy.head());
         for (const auto *const paths : {&going_, &replaced_})

@@ -8,10 +8,13 @@
 #include <utility>
 
 #include <dirent.h>
+#include <fcntl.h>
 #include <git2.h>
 #include <sys/stat.h>
+#include <unistd.h>
 
 #include "error/errorUtil/GitResult.hpp"
+#include "main/checkout/gitlinks.hpp"
 #include "util/repository/objectIds.hpp"
 #include "util/repository/repository.hpp"
 
@@ -41,10 +44,17 @@ std::string workdirOf(git_repository *repository)
     return workdir != nullptr ? workdir : "";
 }
 
+/// Returns 0, or why files of the folder may not be created and removed.
+int accessError(const std::string &folder)
+{
+    return ::faccessat(AT_FDCWD, folder.c_str(), W_OK | X_OK, AT_EACCESS) == 0 ? 0 : errno;
+}
+
 } // namespace
 
 WorkingCopy::WorkingCopy(git_repository *repository)
-    : repository_(repository), root_(workdirOf(repository)), index_(getRepositoryIndex(repository))
+    : repository_(repository), root_(workdirOf(repository)), index_(getRepositoryIndex(repository)),
+      hasIndex_(standingAt(git_index_path(index_.get())) != Standing::Nothing)
 {
     const OwnedHandle<git_reference> head = lookupHead(repository);
     if (head != nullptr)
@@ -143,6 +153,7 @@ void WorkingCopy::forget()
     ways_.clear();
     wayToFolder_ = nullptr;
     asked_.clear();
+    examined_.reset();
 }
 
 WorkingCopy::Way WorkingCopy::wayInto(const std::string &folder, const Way &above) const
@@ -165,6 +176,43 @@ WorkingCopy::Way WorkingCopy::wayInto(const std::string &folder, const Way &abov
     // An unchanged file or link of HEAD is removed first.
     const bool goesFirst = isReplaced && standing != Standing::Special;
     return goesFirst ? Way{Standing::Nothing, ""} : Way{standing, folder};
+}
+
+const std::string &WorkingCopy::unwritableFolderOf(const std::string &name)
+{
+    const std::size_t size = name.rfind('/') + 1;
+    if (examined_ && name.compare(0, size, *examined_) == 0)
+    {
+        return unwritable_;
+    }
+    std::string folder = name.substr(0, size);
+    examined_ = folder;
+    int error = accessError(root_ + folder);
+    while (!folder.empty() && (error == ENOENT || error == ENOTDIR))
+    {
+        folder.pop_back();
+        folder.resize(folder.rfind('/') + 1);
+        error = accessError(root_ + folder);
+    }
+    const bool isUnwritable = error == EACCES || error == EROFS;
+    unwritable_ = isUnwritable ? (folder.empty() ? "./" : folder) : "";
+    return unwritable_;
+}
+
+void WorkingCopy::readModulesFor(const TreeChange &change) const
+{
+    if (!isGitlink(change.after))
+    {
+        return;
+    }
+    const GitResult<void> found =
+        call(git_submodule_lookup, nullptr, repository_, change.path.c_str());
+    const int code = found.has_error() ? found.error().getCode() : 0;
+    // It need not be in the file.
+    if (code != GIT_ENOTFOUND && code != GIT_EEXISTS)
+    {
+        found.value();
+    }
 }
 
 const git_index_entry *WorkingCopy::entryOf(const std::string &name)

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include <optional>
 #include <string>
 #include <unordered_map>
 
@@ -10,6 +11,7 @@
 
 #include "error/errorUtil/OwnedHandle.hpp"
 #include "main/checkout/standing.hpp"
+#include "main/checkout/treeChanges.hpp"
 #include "util/repository/Head.hpp"
 
 namespace vclink::git
@@ -34,6 +36,11 @@ class WorkingCopy
     git_index *index() const noexcept
     {
         return index_.get();
+    }
+    /// Returns false if there is no index file: no file was checked out yet.
+    bool hasIndex() const noexcept
+    {
+        return hasIndex_;
     }
 
     /// Returns what is at a name: nothing if something above it is not a folder.
@@ -63,6 +70,14 @@ class WorkingCopy
     /// Forgets folders and entry. To be called when files or the index may have changed.
     void forget();
 
+    /// Returns the nearest folder above a name, with a slash at its end, if the process may not
+    /// create and remove files in it. "./" for the root; empty if it may. Remembers the last one.
+    const std::string &unwritableFolderOf(const std::string &name);
+    /// Reads `.gitmodules` if the checkout creates or moves a submodule: libgit2 does so in the
+    /// middle of its writing. git_submodule_lookup.
+    /// @throws LibGit2Exception if it cannot be read
+    void readModulesFor(const TreeChange &change) const;
+
     bool isInHead(const std::string &name) const;
     /// Returns true if HEAD has a folder of this name.
     bool isFolderInHead(const std::string &name) const;
@@ -89,6 +104,7 @@ class WorkingCopy
     git_repository *repository_;
     std::string root_;
     OwnedHandle<git_index> index_;
+    bool hasIndex_;
     Head headThen_;
     OwnedHandle<git_tree> head_;
     const Way wayToRoot_{};
@@ -100,6 +116,9 @@ class WorkingCopy
     std::string asked_;
     const git_index_entry *entry_ = nullptr;
     std::string path_;
+    /// The folder that was examined last, and what came out.
+    std::optional<std::string> examined_;
+    std::string unwritable_;
 };
 
 } // namespace vclink::git

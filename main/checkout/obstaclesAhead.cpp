@@ -27,6 +27,11 @@ bool isWrittenUnnoticed(WorkingCopy &copy, const TreeChange &change)
     return change.before != nullptr && makesFile(change) && copy.entryOf(change.path) == nullptr;
 }
 
+bool isLink(const git_tree_entry *entry)
+{
+    return git_tree_entry_filemode(entry) == GIT_FILEMODE_LINK;
+}
+
 Obstacle stagedChangesOf(const std::string &name)
 {
     return {name, "the staged changes of '" + name + "' would be lost in the checkout"};
@@ -81,6 +86,25 @@ Finding findMissingFolder(WorkingCopy &copy, const TreeChange &change)
                                      "--source=HEAD --staged --worktree' first"};
 }
 
+Finding findMissingFileOfOtherKind(WorkingCopy &copy, const TreeChange &change)
+{
+    const bool isFileOrLink =
+        change.before != nullptr && !isGitlink(change.before) && makesFile(change);
+    if (!isFileOrLink || isLink(change.before) == isLink(change.after) ||
+        copy.at(change.path) != Standing::Nothing)
+    {
+        return {};
+    }
+    const std::string name = "'" + change.path + "'";
+    const std::string kinds = isLink(change.after)
+                                  ? "file " + name + ", which becomes a symbolic link"
+                                  : "symbolic link " + name + ", which becomes a file";
+    return Obstacle{change.path,
+                    "the " + kinds +
+                        ", is missing: bring it back with 'git restore "
+                        "--ignore-skip-worktree-bits --source=HEAD --staged --worktree' first"};
+}
+
 Finding findSubmodule(WorkingCopy &copy, const TreeChange &change)
 {
     const bool isReplaced = isGitlink(change.before) && makesFile(change);
@@ -127,6 +151,15 @@ Finding findStagedBelowSubmodule(WorkingCopy &copy, const TreeChange &change)
     return name.empty() ? Finding() : stagedChangesOf(name);
 }
 
+Finding findStagedDeletion(WorkingCopy &copy, const TreeChange &change)
+{
+    const bool isDeleted = change.before != nullptr && !isGitlink(change.before) &&
+                           copy.entryOf(change.path) == nullptr && copy.hasIndex();
+    const bool isLost =
+        isDeleted && (change.after != nullptr || copy.at(change.path) != Standing::Nothing);
+    return isLost ? stagedChangesOf(change.path) : Finding();
+}
+
 Finding findStagedContent(WorkingCopy &copy, const TreeChange &change)
 {
     const git_index_entry *const entry = copy.entryOf(change.path);
@@ -145,6 +178,22 @@ Finding findStagedContent(WorkingCopy &copy, const TreeChange &change)
     return stagedChangesOf(change.path);
 }
 
+Finding findUnwritableFolder(WorkingCopy &copy, const TreeChange &change)
+{
+    // A file that stays a file is written to.
+    const bool isWritten = change.before != nullptr && makesFile(change) &&
+                           !isGitlink(change.before) && !isLink(change.before) &&
+                           !isLink(change.after);
+    if (isWritten)
+    {
+        return {};
+    }
+    const std::string &folder = copy.unwritableFolderOf(change.path);
+    return folder.empty()
+               ? Finding()
+               : Obstacle{change.path, "the folder '" + folder + "' cannot be written to"};
+}
+
 Finding findFolderForDeletedFile(WorkingCopy &copy, const TreeChange &change)
 {
     const bool isDeleted =
@@ -156,11 +205,12 @@ Finding findFolderForDeletedFile(WorkingCopy &copy, const TreeChange &change)
 
 Finding findSubmoduleAfterSibling(WorkingCopy &copy, const TreeChange &change)
 {
-    if (!isGitlink(change.before) || copy.at(change.path) != Standing::Folder)
+    const git_index_entry *const entry = copy.entryOf(change.path);
+    const bool isSubmodule = isGitlink(change.before) || isGitlink(entry);
+    if (!isSubmodule || copy.at(change.path) != Standing::Folder)
     {
         return {};
     }
-    const git_index_entry *const entry = copy.entryOf(change.path);
     const bool isMovedByOurs = isGitlink(entry) && !isOf(*entry, change.before);
     const bool isMergedAlone = isGitlink(change.after) && !isMovedByOurs;
     const bool isInTheWay =
@@ -197,6 +247,15 @@ Finding findUntracked(WorkingCopy &copy, const TreeChange &change)
         return {};
     }
     return inTheWay(change.path, standing);
+}
+
+Finding findUntrackedOfHead(WorkingCopy &copy, const TreeChange &change)
+{
+    const bool isDeleted = change.before != nullptr && change.after == nullptr &&
+                           copy.entryOf(change.path) == nullptr && copy.isInHead(change.path);
+    const Standing standing = isDeleted ? copy.at(change.path) : Standing::Nothing;
+    const bool isInTheWay = standing != Standing::Nothing && standing != Standing::Folder;
+    return isInTheWay ? inTheWay(change.path, standing) : Finding();
 }
 
 Finding findYielding(WorkingCopy &copy, const TreeChange &change)

@@ -24,6 +24,9 @@ Finding findForeignInFolder(WorkingCopy &copy, const TreeChange &change);
 /// Finds a missing folder that becomes a file or a submodule: libgit2 would write neither that nor
 /// its entry.
 Finding findMissingFolder(WorkingCopy &copy, const TreeChange &change);
+/// Finds a missing file that becomes a symbolic link, or a missing link that becomes a file:
+/// libgit2 would write neither that nor its entry.
+Finding findMissingFileOfOtherKind(WorkingCopy &copy, const TreeChange &change);
 /// Finds a submodule with files that becomes a file.
 Finding findSubmodule(WorkingCopy &copy, const TreeChange &change);
 /// Finds a staged commit of a submodule that neither side has, or its staged removal: libgit2 would
@@ -34,6 +37,9 @@ Finding findStagedSubmodule(WorkingCopy &copy, const TreeChange &change);
 Finding findFolderOfOtherUse(WorkingCopy &copy, const TreeChange &change);
 /// Finds something staged in a folder that becomes a submodule: the index cannot have both.
 Finding findStagedBelowSubmodule(WorkingCopy &copy, const TreeChange &change);
+/// Finds the staged deletion of a file that the target has, or that is still there: libgit2 would
+/// track the file again, or delete it.
+Finding findStagedDeletion(WorkingCopy &copy, const TreeChange &change);
 /// Finds staged content that neither side nor the file has: libgit2 compares only the file, and
 /// discards the entry.
 Finding findStagedContent(WorkingCopy &copy, const TreeChange &change);
@@ -48,6 +54,9 @@ Finding findFileForSubmodule(WorkingCopy &copy, const TreeChange &change);
 /// working tree has a name that it sorts between the two, e.g. "file-1" for "file".
 Finding findFolderForDeletedFile(WorkingCopy &copy, const TreeChange &change);
 
+/// Finds a folder in which the process may not create or remove files, if it has to.
+Finding findUnwritableFolder(WorkingCopy &copy, const TreeChange &change);
+
 // Before a merge: `before` is an entry of a merge base's tree, `after` of the other side's.
 
 /// As findBlockedWay, but ignored links and files do not count.
@@ -56,10 +65,14 @@ Finding findBlockedWayOfMerge(WorkingCopy &copy, const TreeChange &change);
 /// empty folder. A folder is always in the way if we have deleted the file and the other side has
 /// changed it.
 Finding findUntracked(WorkingCopy &copy, const TreeChange &change);
-/// Finds the folder of a submodule that the other side has removed or replaced, or that both have
-/// moved, if the working tree has a name that libgit2 sorts between the submodule and its folder:
-/// libgit2 would delete the folder, or not see the change.
+/// Finds the folder of a submodule that the other side has removed or replaced, that both have
+/// moved, or that only we have in a place that the other side changed as well, if the working tree
+/// has a name that libgit2 sorts between the submodule and its folder: libgit2 would delete the
+/// folder, or not see the change.
 Finding findSubmoduleAfterSibling(WorkingCopy &copy, const TreeChange &change);
+/// Finds a file that the user no longer tracks and the other side has deleted or renamed. libgit2
+/// would delete it, because HEAD still has it.
+Finding findUntrackedOfHead(WorkingCopy &copy, const TreeChange &change);
 /// Finds what is removed for a new file if libgit2 reports it before it writes: an ignored link in
 /// its place, an ignored link or file above. For changes to which the other rules of a merge do not
 /// object.

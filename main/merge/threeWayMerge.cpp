@@ -20,6 +20,7 @@
 #include "error/raise.hpp"
 #include "fl/i18n/convert.hpp"
 #include "main/checkout/CheckoutWatch.hpp"
+#include "main/checkout/gitlinks.hpp"
 #include "main/merge/BranchMerger.hpp"
 #include "main/mergeState/MergeMarker.hpp"
 #include "main/mergeState/mergeHead.hpp"
@@ -53,11 +54,18 @@ bool isUnmergeable(git_repository *repository, const char *path)
            (text == GIT_ATTR_VALUE_FALSE && merge == GIT_ATTR_VALUE_STRING);
 }
 
+/// Returns true if our side of a conflict is a submodule, or nothing beside theirs. There is no
+/// file to write then, and a checkout could delete the submodule's folder.
+bool isOfSubmodule(const git_index_entry *ours, const git_index_entry *theirs)
+{
+    return isGitlink(ours) || (ours == nullptr && isGitlink(theirs));
+}
+
 /// Restores the empty folder of a submodule in conflict that is not populated. libgit2 removes it,
 /// and a commit would treat the submodule as deleted.
 void bringFolderBack(git_repository *repository, const git_index_entry *ours)
 {
-    if (ours != nullptr && ours->mode == GIT_FILEMODE_COMMIT)
+    if (isGitlink(ours))
     {
         std::error_code stays;
         std::filesystem::create_directories(
@@ -82,9 +90,14 @@ std::vector<ustring> listUnmergeable(git_repository *repository, git_index *inde
             return paths;
         }
         next.value();
-        collectUnmergeable(repository, paths, ancestor);
-        collectUnmergeable(repository, paths, ours);
-        collectUnmergeable(repository, paths, theirs);
+        std::vector<ustring> ofConflict;
+        collectUnmergeable(repository, ofConflict, ancestor);
+        collectUnmergeable(repository, ofConflict, ours);
+        collectUnmergeable(repository, ofConflict, theirs);
+        if (!isOfSubmodule(ours, theirs))
+        {
+            paths.insert(paths.end(), ofConflict.begin(), ofConflict.end());
+        }
         bringFolderBack(repository, ours);
     }
 }

@@ -154,6 +154,8 @@ std::vector<Tolerance> tolerancesOfOthers(const std::string &operation, const st
         {"getRemoteBranches", "git_branch_next", 1, GIT_ITEROVER, "done: "},
         {"getRemoteBranches", "git_branch_next", 2, GIT_ITEROVER, normal},
         {"merge", "git_index_conflict_next", any, GIT_ITEROVER, normal},
+        // A submodule need not be in .gitmodules.
+        {"", "git_submodule_lookup", any, GIT_ENOTFOUND, normal},
         // A name that HEAD does not have, and histories without a common commit.
         {"", "git_tree_entry_bypath", any, GIT_ENOTFOUND, normal},
         // Both sides have added the file then, for all one knows. What the call has given counts.

@@ -175,6 +175,27 @@ TEST_F(MergeObstacles, AreNotFilesThatWeDroppedAndTheyDidNotTouch)
     EXPECT_THAT(status(), ElementsAre("?? d/f"));
 }
 
+TEST_F(MergeObstacles, AreIgnoredFilesThatAreStagedAsDeletedAndThatTheyDeletedOrRenamed)
+{
+    diverge(writing("ours", "x"),
+            [this]
+            {
+                repository_.remove("file");
+                repository_.git({"mv", "d/f", "renamed"});
+            });
+    repository_.git({"rm", "--quiet", "--cached", "file", "d/f"});
+    repository_.write(".git/info/exclude", "file\nd/f\n");
+    for (const std::string name : {"d/f", "file"})
+    {
+        repository_.write(name, "mine\n");
+        expectMergeRefused(inTheWay("untracked file '" + name + "'"));
+        EXPECT_FALSE(makeTwin().tryGit({"merge", "topic"}).succeeded());
+        repository_.remove(name);
+    }
+    merge("topic");
+    EXPECT_EQ(parents().size(), 2U);
+}
+
 TEST_F(MergeObstacles, AreNotIgnoredFilesWhichAreOverwrittenAsGitDoes)
 {
     theyWrite({"ignored", "d/ignored", "ignored-folder", "n/ignored-file/a"});

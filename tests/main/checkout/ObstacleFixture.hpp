@@ -65,6 +65,10 @@ class ObstacleFixture : public MergeFixture
     {
         return refusal("the " + what + " is in the way of the checkout");
     }
+    static Failure staged(const std::string &name)
+    {
+        return refusal("the staged changes of '" + name + "' would be lost in the checkout");
+    }
     static Failure inChangedFolder(const std::string &what)
     {
         return refusal("the " + what + " is in a folder that becomes a file");

@@ -51,6 +51,13 @@ class SubmoduleObstacles : public vclink::test::ObstacleFixture
         repository_.commitAll("on topic");
         repository_.git({"checkout", "--quiet", "main"});
     }
+    /// Makes a repository with one commit, without an entry in .gitmodules.
+    void embed(const std::string &name) const
+    {
+        auto embedded = GitRepository::init(repository_ / name);
+        embedded.write("own", "x");
+        embedded.commitAll("embedded");
+    }
     void populate() const
     {
         repository_.git({"submodule", "--quiet", "update", "--init"});
@@ -64,10 +71,6 @@ class SubmoduleObstacles : public vclink::test::ObstacleFixture
     {
         expectSwitchRefused(failure, branch);
         expectNothingChanges([&] { EXPECT_EQ(failureOfMerge(branch), textOf(failure)); });
-    }
-    static Failure staged(const std::string &name)
-    {
-        return refusal("the staged changes of '" + name + "' would be lost in the checkout");
     }
 
     const GitRepository module_{repository_ / "module"};
@@ -247,6 +250,69 @@ TEST_F(SubmoduleObstacles, OfAMergeAreFoldersThatBecomeAFileBehindASibling)
     repository_.write("ours", "x");
     repository_.commitAll("on main");
     expectMergeRefused(inTheWay("folder 'module'"));
+}
+
+/// The other side has something else in the place, which the merge base may have as a file.
+TEST_F(SubmoduleObstacles, OfAMergeAreFoldersThatOnlyWeHaveBehindASibling)
+{
+    repository_.write("module-1", "x");
+    repository_.commitAll("a name that sorts before the folder's");
+    for (const bool hasFileBefore : {false, true})
+    {
+        SCOPED_TRACE(hasFileBefore);
+        if (hasFileBefore)
+            repository_.write("module", "a file\n");
+        repository_.commitAll("before");
+        makeBranch("topic", writing("module", "theirs\n"));
+        if (hasFileBefore)
+            repository_.remove("module");
+        embed("module");
+        repository_.commitAll("on main");
+        repository_.write("module/mine", "mine\n");
+        expectMergeRefused(inTheWay("folder 'module'"));
+        repository_.git({"branch", "--quiet", "-D", "topic"});
+        repository_.remove("module");
+    }
+}
+
+TEST_F(SubmoduleObstacles, InConflictKeepTheirFolderIfTheyCannotBeMixed)
+{
+    repository_.write(".gitattributes", "* -merge\n");
+    repository_.commitAll("attributes");
+    diverge([this] { embed("module"); },
+            [this]
+            {
+                repository_.write("module", "theirs\n");
+                repository_.write("module-1", "a name that sorts before the folder's");
+            });
+    repository_.write("module/mine", "mine\n");
+    expectConflicts("topic");
+    EXPECT_EQ(repository_.read("module/mine"), "mine\n");
+    EXPECT_EQ(module_.line({"log", "--format=%s"}), "embedded");
+    EXPECT_THAT(conflicts(), ElementsAre("2 module", "3 module"));
+}
+
+TEST_F(SubmoduleObstacles, AreModulesFilesThatCannotBeRead)
+{
+    makeBranch("topic",
+               [this]
+               {
+                   repository_.write("a first", "x");
+                   embed("module");
+               });
+    repository_.remove("module");
+    repository_.write(".gitmodules", "broken [\n");
+    const Failure failure{GIT_ERROR, GIT_ERROR_CONFIG,
+                          "failed to parse config file: invalid configuration key (in " +
+                              (repository_ / ".gitmodules").string() + ":1)"};
+    expectRefused(failure, "topic");
+    repository_.write("ours", "x");
+    repository_.add({"ours"});
+    repository_.git({"commit", "--quiet", "-m", "ours"});
+    expectMergeRefused(failure);
+    repository_.remove(".gitmodules");
+    merge("topic");
+    EXPECT_EQ(parents().size(), 2U);
 }
 
 TEST_F(SubmoduleObstacles, AreFilesThatAreStagedInThePlaceOfASubmodule)

@@ -10,6 +10,7 @@
 
 #include "../TestOptionsFactory.hpp"
 #include "ObstacleFixture.hpp"
+#include "support/UnprivilegedUser.hpp"
 #include "support/text.hpp"
 #include "vclink/util/exception/CancelledOperationException.hpp"
 
@@ -25,6 +26,8 @@ using vclink::test::failureOf;
 using vclink::test::GitRepository;
 using vclink::test::makeFifo;
 using vclink::test::makeSocket;
+using vclink::test::RepositoryState;
+using vclink::test::stateOf;
 using vclink::util::exception::CancelledOperationException;
 
 /// A switch and a fast-forward beside what the user has not committed.
@@ -139,6 +142,37 @@ TEST_F(SwitchObstacles, AreMissingFilesThatBecomeAFolder)
 }
 
 /// libgit2 moves on without the file. git does without the folder.
+/// libgit2 would pass them by, and the next commit would undo the branch's change.
+TEST_F(SwitchObstacles, AreMissingFilesThatBecomeALinkAndMissingLinksThatBecomeAFile)
+{
+    repository_.symlink("file", "link");
+    repository_.commitAll("a link");
+    makeTopic(
+        [this]
+        {
+            repository_.remove("other");
+            repository_.symlink("file", "other");
+            repository_.remove("link");
+            repository_.write("link", "a file\n");
+        });
+    const std::string restore = ", is missing: bring it back with 'git restore "
+                                "--ignore-skip-worktree-bits --source=HEAD --staged --worktree' "
+                                "first";
+    repository_.remove("link");
+    expectRefused(refusal("the symbolic link 'link', which becomes a file" + restore));
+    for (const std::string mark : {"--refresh", "--skip-worktree", "--assume-unchanged"})
+    {
+        SCOPED_TRACE(mark);
+        repository_.git({"reset", "--quiet", "--hard"});
+        repository_.git({"update-index", mark, "other"});
+        repository_.remove("other");
+        expectRefused(refusal("the file 'other', which becomes a symbolic link" + restore));
+        repository_.git({"restore", "--ignore-skip-worktree-bits", "--source=HEAD", "--staged",
+                         "--worktree", "other"});
+    }
+    expectSwitches();
+}
+
 TEST_F(SwitchObstacles, AreMissingFoldersThatBecomeAFile)
 {
     makeTopic(
@@ -181,6 +215,29 @@ TEST_F(SwitchObstacles, AreThingsInAFolderThatBecomesAFile)
 }
 
 /// libgit2's walk is past "n" when it comes to "n/new".
+TEST_F(SwitchObstacles, AreFoldersThatMayNotBeWrittenTo)
+{
+    makeTopic(
+        [this]
+        {
+            repository_.remove("d/f");
+            repository_.write("d/new/a", "x");
+        });
+    fs::permissions(repository_ / "d", fs::perms(0555));
+    const RepositoryState before = stateOf(repository_);
+    vclink::test::giveToUnprivilegedUser(folder().path());
+    const std::string text = vclink::test::runAsUnprivilegedUser(
+        [&]
+        {
+            return failureOf([&] { branches().switchBranch("topic"); }).text + '\n' +
+                   failureOfMerge("topic");
+        });
+    repository_.git({"config", "--global", "safe.directory", "*"});
+    const Failure failure = refusal("the folder 'd/' cannot be written to");
+    EXPECT_EQ(text, failure.text + '\n' + textOf(failure));
+    EXPECT_EQ(stateOf(repository_), before);
+}
+
 TEST_F(SwitchObstacles, AreFilesThatLibGit2IsPast)
 {
     repository_.write("n-b", "x");
@@ -224,15 +281,37 @@ TEST_F(SwitchObstacles, AreStagedChangesThatTheFileDoesNotShow)
         repository_.write(name, "staged\n");
         repository_.add({name});
         repository_.remove(name);
-        const auto failure =
-            refusal("the staged changes of '" + name + "' would be lost in the checkout");
-        expectRefused(failure);
+        expectRefused(staged(name));
         repository_.write(name, name == "d/f" ? "f\n" : "g\n");
-        expectRefused(failure);
+        expectRefused(staged(name));
         repository_.git({"reset", "--quiet", "--hard"});
         repository_.git({"clean", "--quiet", "--force"});
     }
     expectSwitches();
+}
+
+TEST_F(SwitchObstacles, AreStagedDeletionsOfFilesThatTheBranchHasOrThatAreStillThere)
+{
+    makeTopic(
+        [this]
+        {
+            repository_.write("other", "theirs\n");
+            repository_.remove("d/f");
+        });
+    for (const std::string name : {"other", "d/f"})
+    {
+        SCOPED_TRACE(name);
+        repository_.git({"rm", "--quiet", "--cached", name});
+        expectRefused(staged(name));
+        EXPECT_FALSE(makeTwin().tryGit({"switch", "topic"}).succeeded());
+        repository_.git({"reset", "--quiet"});
+    }
+    repository_.git({"rm", "--quiet", "other"});
+    expectRefused(staged("other"));
+    repository_.git({"reset", "--quiet", "--hard"});
+    repository_.git({"rm", "--quiet", "d/f"});
+    expectSwitches();
+    EXPECT_THAT(status(), IsEmpty());
 }
 
 TEST_F(SwitchObstacles, AreNotStagedChangesThatTheBranchHasAsWell)
