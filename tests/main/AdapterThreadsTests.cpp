@@ -9,7 +9,6 @@
 #include "support/text.hpp"
 #include "vclink/git/GitAdapterFactory.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
-#include "vclink/git/LibGit2Version.hpp"
 
 namespace
 {

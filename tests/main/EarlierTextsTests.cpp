@@ -2,7 +2,6 @@
 // libgit2 fails without a text in places, and leaves a text where it goes on from a failure of its
 // own: the one is never shown for the other.
 #include <functional>
-#include <memory>
 #include <set>
 #include <string>
 #include <utility>

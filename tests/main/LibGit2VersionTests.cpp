@@ -1,6 +1,5 @@
 // SPDX-License-Identifier: MIT
 #include <cstdio>
-#include <string>
 
 #include <git2.h>
 #include <gmock/gmock.h>

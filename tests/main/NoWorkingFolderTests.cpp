@@ -2,10 +2,8 @@
 // The process's working folder may be deleted while a host runs: no operation on an absolute root
 // needs it.
 #include <filesystem>
-#include <memory>
 #include <string>
 
-#include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include "main/remote/RemoteFixture.hpp"

@@ -2,7 +2,6 @@
 #include <filesystem>
 #include <string>
 
-#include <git2.h>
 #include <gtest/gtest.h>
 
 #include "AdapterFixture.hpp"

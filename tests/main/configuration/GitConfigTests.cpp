@@ -1,5 +1,4 @@
 // SPDX-License-Identifier: MIT
-#include <cstdlib>
 #include <filesystem>
 #include <optional>
 #include <string>

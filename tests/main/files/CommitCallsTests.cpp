@@ -21,14 +21,9 @@ using testing::Contains;
 using testing::ElementsAre;
 using testing::IsEmpty;
 using testing::Not;
-using vclink::test::Failure;
-using vclink::test::failureOf;
-using vclink::test::LibGit2Recorder;
-using vclink::test::NothingChanges;
-using vclink::test::RepositoryState;
-using vclink::test::stateOf;
+using namespace vclink::test;
 
-class CommitCalls : public vclink::test::CommitFixture
+class CommitCalls : public CommitFixture
 {
   protected:
     CommitCalls()
@@ -83,14 +78,6 @@ TEST_F(CommitCalls, OfAMergeLookUpItsHeadsBeforeAnythingIsTouched)
                             "git_signature_default"));
 }
 
-TEST_F(CommitCalls, OfAnUnbornBranchLookUpNoCommit)
-{
-    repository_.git({"checkout", "--quiet", "--orphan", "second"});
-    startNoting();
-    commitOnce();
-    EXPECT_THAT(calls_->steps(), Not(Contains("git_commit_lookup")));
-}
-
 TEST_F(CommitCalls, MakeAnIdentityOnlyWhereNoneIsConfigured)
 {
     startNoting();
@@ -106,10 +93,13 @@ TEST_F(CommitCalls, MakeAnIdentityOnlyWhereNoneIsConfigured)
     EXPECT_EQ(calls_->steps().at(11), "git_repository_index");
 }
 
-TEST_F(CommitCalls, RefreshTheWholeIndexWithoutACallback)
+TEST_F(CommitCalls, AskForTheCommitAtHeadAndRefreshTheWholeIndexWithoutACallback)
 {
     int count = 0;
+    std::vector<std::string> asked;
     startNoting();
+    calls_->on<git_reference_dwim>([&](git_reference **, git_repository *, const char *name)
+                                   { asked.emplace_back(name); });
     calls_->on<git_index_update_all>(
         [&](git_index *, const git_strarray *pathspec, git_index_matched_path_cb callback,
             void *payload)
@@ -121,16 +111,11 @@ TEST_F(CommitCalls, RefreshTheWholeIndexWithoutACallback)
         });
     commitOnce();
     EXPECT_EQ(count, 1);
-}
-
-TEST_F(CommitCalls, AskForTheCommitAtHead)
-{
-    std::vector<std::string> asked;
-    startNoting();
-    calls_->on<git_reference_dwim>([&](git_reference **, git_repository *, const char *name)
-                                   { asked.emplace_back(name); });
-    commitOnce();
     EXPECT_THAT(asked, ElementsAre("HEAD"));
+    repository_.git({"checkout", "--quiet", "--orphan", "second"});
+    startNoting();
+    commitOnce();
+    EXPECT_THAT(calls_->steps(), Not(Contains("git_commit_lookup")));
 }
 
 TEST_F(CommitCalls, GiveOneSignatureTwiceAndTheEncodingAlways)
@@ -184,25 +169,17 @@ TEST_F(CommitCalls, ReadTheIndexFileAgainBeforeTheyWriteIt)
                             "git_index_free", "git_index_write"));
 }
 
-TEST_F(CommitCalls, PutBackOnlyWhatIsNotCheckedOut)
+TEST_F(CommitCalls, PutBackOnlyWhatIsNotCheckedOutAndNotThere)
 {
-    repository_.git({"update-index", "--skip-worktree", "file", "sub/inside"});
+    repository_.write("there", "x");
+    repository_.commitAll("second");
+    repository_.git({"update-index", "--skip-worktree", "file", "sub/inside", "there"});
     for (const auto *name : {"file", "sub/inside", "other"})
         repository_.remove(name);
     startNoting();
     commitOnce();
     EXPECT_THAT(calls_->steps(), Contains("git_index_add").Times(2));
-    EXPECT_THAT(namesIn(), ElementsAre("file", "sub/inside"));
-}
-
-TEST_F(CommitCalls, PutBackNothingThatIsStillThere)
-{
-    repository_.git({"update-index", "--skip-worktree", "file", "other"});
-    repository_.remove("file");
-    startNoting();
-    commitOnce();
-    EXPECT_THAT(calls_->steps(), Contains("git_index_add").Times(1));
-    EXPECT_THAT(namesIn(), ElementsAre("file", "other", "sub/inside"));
+    EXPECT_THAT(namesIn(), ElementsAre("file", "sub/inside", "there"));
 }
 
 /// Three stages become one entry, and none is gone.

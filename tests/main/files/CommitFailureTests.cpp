@@ -7,8 +7,6 @@
 #include <gtest/gtest.h>
 
 #include "CommitFixture.hpp"
-#include "support/Descriptors.hpp"
-#include "support/UnprivilegedUser.hpp"
 
 namespace
 {
@@ -17,19 +15,13 @@ namespace fs = std::filesystem;
 using testing::ElementsAre;
 using testing::HasSubstr;
 using testing::StartsWith;
-using vclink::test::Failure;
-using vclink::test::failureOf;
-using vclink::test::GitRepository;
-using vclink::test::NothingChanges;
-using vclink::test::RepositoryState;
-using vclink::test::stateOf;
-using vclink::test::States;
+using namespace vclink::test;
 
 const std::string missingId = "1234567890123456789012345678901234567890";
 const std::string notAnIndex = "this is no index, and long enough to be told from an empty one";
 
 /// A working copy in which "file" is changed, "other" deleted and "new" untracked.
-class CommitFailure : public vclink::test::CommitFixture
+class CommitFailure : public CommitFixture
 {
   protected:
     CommitFailure()
@@ -69,50 +61,29 @@ class CommitFailure : public vclink::test::CommitFixture
     }
 };
 
-const Failure tipIsNotTheParent{GIT_EMODIFIED, GIT_ERROR_OBJECT,
-                                "failed to create commit: current tip is not the first parent"};
-
-TEST_F(CommitFailure, OfAHeadThatHoldsGarbageIsToldWhenTheCommitIsMade)
+/// One that can't be told has no parent for the commit, which then does not follow the branch's.
+TEST_F(CommitFailure, OfAHeadOrABranchThatNamesNoCommitIsToldWhenTheCommitIsMade)
 {
-    const Failure corrupted{GIT_ERROR, GIT_ERROR_REFERENCE, "corrupted loose reference file: HEAD"};
-    expectFailsWith(".git/HEAD", "garbage\n", corrupted);
-    expectFailsWith(".git/HEAD", "", corrupted);
-}
-
-TEST_F(CommitFailure, OfABranchThatHoldsGarbageIsToldWhenTheCommitIsMade)
-{
-    expectFailsWith(
-        ".git/refs/heads/main", "garbage\n",
-        {GIT_ERROR, GIT_ERROR_REFERENCE, "corrupted loose reference file: refs/heads/main"});
-}
-
-/// The commit would have no parent, so that it does not follow the branch's.
-TEST_F(CommitFailure, OfABranchWhoseCommitIsMissingIsToldWhenTheCommitIsMade)
-{
-    expectFailsWith(".git/refs/heads/main", missingId + '\n', tipIsNotTheParent);
-}
-
-TEST_F(CommitFailure, OfADetachedHeadWhoseCommitIsMissingIsToldWhenTheCommitIsMade)
-{
-    expectFailsWith(".git/HEAD", missingId + '\n', tipIsNotTheParent);
-}
-
-TEST_F(CommitFailure, OfABranchThatNamesNoCommitIsToldWhenTheCommitIsMade)
-{
-    expectFailsWith(".git/refs/heads/main", idOf("HEAD^{tree}") + '\n', tipIsNotTheParent);
-}
-
-TEST_F(CommitFailure, OfAHeadThatNamesAFolderOfBranchesIsToldWhenTheCommitIsMade)
-{
-    expectFailsWith(".git/HEAD", "ref: refs/heads\n",
-                    {GIT_EDIRECTORY, GIT_ERROR_REFERENCE,
-                     "cannot lock ref 'refs/heads', there are refs beneath that folder"});
-}
-
-TEST_F(CommitFailure, OfAHeadThatLeadsToItselfIsToldWhenTheCommitIsMade)
-{
-    expectFailsWith(".git/HEAD", "ref: HEAD\n",
-                    {GIT_ERROR, GIT_ERROR_REFERENCE, "cannot resolve reference (>10 levels deep)"});
+    const std::string head = ".git/HEAD";
+    const std::string branch = ".git/refs/heads/main";
+    const auto reference = [](int code, const std::string &text) {
+        return Failure{code, GIT_ERROR_REFERENCE, text};
+    };
+    const auto corrupted = [&](const std::string &name)
+    { return reference(GIT_ERROR, "corrupted loose reference file: " + name); };
+    const Failure noParent{GIT_EMODIFIED, GIT_ERROR_OBJECT,
+                           "failed to create commit: current tip is not the first parent"};
+    expectFailsWith(head, "garbage\n", corrupted("HEAD"));
+    expectFailsWith(head, "", corrupted("HEAD"));
+    expectFailsWith(branch, "garbage\n", corrupted("refs/heads/main"));
+    expectFailsWith(branch, missingId + '\n', noParent);
+    expectFailsWith(head, missingId + '\n', noParent);
+    expectFailsWith(branch, idOf("HEAD^{tree}") + '\n', noParent);
+    expectFailsWith(head, "ref: refs/heads\n",
+                    reference(GIT_EDIRECTORY, "cannot lock ref 'refs/heads', there are refs "
+                                              "beneath that folder"));
+    expectFailsWith(head, "ref: HEAD\n",
+                    reference(GIT_ERROR, "cannot resolve reference (>10 levels deep)"));
 }
 
 TEST_F(CommitFailure, OfALockedBranchLeavesTheRefreshInTheIndex)
@@ -163,15 +134,6 @@ TEST_F(CommitFailure, OfALockedIndexChangesNothingAndLeavesTheLock)
     repository_.remove(".git/index.lock");
     commit();
     EXPECT_THAT(namesIn(), ElementsAre("file", "sub/inside"));
-}
-
-TEST_F(CommitFailure, OfALockedIndexLeavesAMergeUnderWay)
-{
-    repository_.git({"reset", "--quiet", "--hard"});
-    beginMerge({"file"});
-    repository_.write(".git/index.lock", "");
-    const NothingChanges nothing(repository_);
-    EXPECT_EQ(failure().code, GIT_ELOCKED);
 }
 
 /// "file" is staged in memory when "sub/inside" is met.
@@ -241,20 +203,6 @@ TEST_F(CommitFailure, OfAFolderThatIsNoRepositoryIsRaised)
         EXPECT_EQ(failureOf([&] { commitIn(none); }).code, GIT_ENOTFOUND);
     }
     EXPECT_TRUE(fs::is_empty(folder() / "plain"));
-}
-
-TEST_F(CommitFailure, LeavesNoDescriptorOpen)
-{
-    const GitRepository locked = GitRepository::clone(repository_.path(), folder() / "locked");
-    locked.write(".git/refs/heads/main.lock", "");
-    configureIdentity(locked);
-    commit();
-    const vclink::test::NoDescriptorLeak noLeak;
-    for (int i = 0; i < 5; ++i)
-    {
-        commit();
-        EXPECT_EQ(failureOf([&] { commitIn(locked); }).code, GIT_ELOCKED);
-    }
 }
 
 /// The same working copy, of a user who may not write all of git's folder.

@@ -2,6 +2,7 @@
 #include <array>
 #include <cstdlib>
 #include <ctime>
+#include <optional>
 #include <string>
 #include <typeinfo>
 #include <utility>
@@ -11,16 +12,14 @@
 #include <unistd.h>
 
 #include "CommitFixture.hpp"
+#include "support/Sentence.hpp"
 #include "support/libgit2Release.hpp"
 
 namespace
 {
 
 using shared_vclink::git::NoUserName;
-using vclink::test::Failure;
-using vclink::test::failureOf;
-using vclink::test::GitRepository;
-using vclink::test::NothingChanges;
+using namespace vclink::test;
 
 using NoUserNameException = vclink::git::TagException<NoUserName>;
 
@@ -31,7 +30,7 @@ const Failure angleBrackets{GIT_ERROR, GIT_ERROR_INVALID,
                             "failed to parse signature - Neither `name` nor `email` should contain "
                             "angle brackets chars."};
 
-const std::string noise(vclink::test::libgit2Release::noiseOfNames);
+const std::string noise(libgit2Release::noiseOfNames);
 
 std::string hostName()
 {
@@ -64,7 +63,7 @@ class TimeZone
 };
 
 /// The tests start with neither a name nor an address configured, and no variable set.
-class CommitIdentity : public vclink::test::CommitFixture
+class CommitIdentity : public CommitFixture
 {
   protected:
     CommitIdentity()
@@ -93,48 +92,107 @@ class CommitIdentity : public vclink::test::CommitFixture
     }
 };
 
-TEST_F(CommitIdentity, IsTheConfiguredOne)
+/// Variables and settings, where they are set, and whom a commit is by, or why it fails.
+struct Person : Sentence
 {
-    setVariable("USER", "builder");
-    setVariable("LOGNAME", "builder");
-    configure("user.name", "Ann O'Neill");
-    configure("user.email", "ann@example.com");
-    EXPECT_EQ(identityAfterCommit(), "Ann O'Neill <ann@example.com>");
+    std::optional<std::string> user;
+    std::optional<std::string> logName;
+    std::optional<std::string> name;
+    std::optional<std::string> address;
+    std::string identity;
+    Failure failure = {};
+};
+
+class CommittingPerson : public CommitIdentity, public testing::WithParamInterface<Person>
+{
+  protected:
+    CommittingPerson()
+    {
+        if (GetParam().user)
+            setVariable("USER", *GetParam().user);
+        if (GetParam().logName)
+            setVariable("LOGNAME", *GetParam().logName);
+        if (GetParam().name)
+            configure("user.name", *GetParam().name);
+        if (GetParam().address)
+            configure("user.email", *GetParam().address);
+    }
+};
+
+class IdentifiedPerson : public CommittingPerson
+{
+};
+
+TEST_P(IdentifiedPerson, IsInTheCommitAndTheReflog)
+{
+    std::string expected = GetParam().identity;
+    if (expected.back() == '@')
+        expected = expected.substr(0, expected.size() - 1) + '@' + hostName();
+    EXPECT_EQ(identityAfterCommit(), expected + '>');
+    EXPECT_EQ(repository_.line({"log", "--walk-reflogs", "-1", "--format=%gn <%ge>"}),
+              expected + '>');
 }
 
-TEST_F(CommitIdentity, NeedsNoVariableWhenItIsConfigured)
+/// The host stands behind an identity that ends in an at sign.
+const Person identifiedPersons[]{
+    {{"Configured"},
+     "builder",
+     "builder",
+     "Ann O'Neill",
+     "ann@example.com",
+     "Ann O'Neill <ann@example.com"},
+    {{"ConfiguredWithoutVariables"}, {}, {}, "Ann", "ann@example.com", "Ann <ann@example.com"},
+    {{"OfTheUserVariable"}, "builder", {}, {}, {}, "builder <builder@"},
+    {{"OfTheUserVariableBesideAName"}, "builder", {}, "Ann", {}, "builder <builder@"},
+    {{"OfTheUserVariableBesideAnAddress"},
+     "builder",
+     {},
+     {},
+     "ann@example.com",
+     "builder <builder@"},
+    {{"OfTheUserVariableBesideTheLogName"}, "builder", "logger", {}, {}, "builder <builder@"},
+    {{"OfTheLogName"}, {}, "logger", {}, {}, "logger <logger@"},
+    {{"OfANameThatIsNoAscii"}, "J\xC3\xBCrg", {}, {}, {}, "J\xC3\xBCrg <J\xC3\xBCrg@"},
+    // The name of the address is as it was; libgit2 cuts what it takes for noise at the ends.
+    {{"OfANameWithNoise"},
+     " the builder" + noise + ' ',
+     {},
+     {},
+     {},
+     "the builder <the builder" + noise + " @"},
+};
+
+INSTANTIATE_TEST_SUITE_P(The, IdentifiedPerson, testing::ValuesIn(identifiedPersons),
+                         testing::PrintToStringParamName());
+
+class RefusedPerson : public CommittingPerson
 {
-    configure("user.name", "Ann");
-    configure("user.email", "ann@example.com");
-    EXPECT_EQ(identityAfterCommit(), "Ann <ann@example.com>");
+};
+
+TEST_P(RefusedPerson, ChangesNothing)
+{
+    expectFailure(GetParam().failure);
 }
 
-TEST_F(CommitIdentity, IsTheUserAtTheHostWhenNothingIsConfigured)
-{
-    setVariable("USER", "builder");
-    EXPECT_EQ(identityAfterCommit(), "builder <builder@" + hostName() + ">");
-}
+const Person refusedPersons[]{
+    {{"WithAnEmptyUserAlsoBesideALogName"}, "", "logger", {}, {}, "", emptyIdentity},
+    {{"WithAnEmptyLogName"}, {}, "", {}, {}, "", emptyIdentity},
+    {{"WithAnEmptyName"}, "builder", {}, "", "ann@example.com", "", emptyIdentity},
+    {{"WithABlankName"}, "builder", {}, "   ", "ann@example.com", "", emptyIdentity},
+    {{"WithANameOfNoise"}, "builder", {}, noise, "ann@example.com", "", emptyIdentity},
+    {{"WithAnEmptyAddress"}, "builder", {}, "Ann", "", "", emptyIdentity},
+    {{"WithAngleBracketsInTheName"},
+     "builder",
+     {},
+     "Ann <ann@example.com>",
+     "ann@example.com",
+     "",
+     angleBrackets},
+    {{"WithAngleBracketsInTheUser"}, "<builder>", {}, {}, {}, "", angleBrackets},
+};
 
-TEST_F(CommitIdentity, TakesNothingFromAConfiguredNameWithoutAnAddress)
-{
-    setVariable("USER", "builder");
-    configure("user.name", "Ann");
-    EXPECT_EQ(identityAfterCommit(), "builder <builder@" + hostName() + ">");
-}
-
-TEST_F(CommitIdentity, TakesNothingFromAConfiguredAddressWithoutAName)
-{
-    setVariable("USER", "builder");
-    configure("user.email", "ann@example.com");
-    EXPECT_EQ(identityAfterCommit(), "builder <builder@" + hostName() + ">");
-}
-
-TEST_F(CommitIdentity, IsLookedForInTheGlobalConfiguration)
-{
-    GitRepository(environment().home())
-        .write(".gitconfig", "[user]\n\tname = Global\n\temail = global@example.com\n");
-    EXPECT_EQ(identityAfterCommit(), "Global <global@example.com>");
-}
+INSTANTIATE_TEST_SUITE_P(The, RefusedPerson, testing::ValuesIn(refusedPersons),
+                         testing::PrintToStringParamName());
 
 TEST_F(CommitIdentity, IsTheRepositorysOwnOverTheGlobalOne)
 {
@@ -161,32 +219,6 @@ TEST_F(CommitIdentity, IsNotTakenFromGitsOwnVariables)
     EXPECT_NE(repository_.line({"log", "-1", "--format=%at"}), "1577836800");
 }
 
-TEST_F(CommitIdentity, IsTheLogNameWhereTheUserIsUnset)
-{
-    setVariable("LOGNAME", "logger");
-    EXPECT_EQ(identityAfterCommit(), "logger <logger@" + hostName() + ">");
-}
-
-TEST_F(CommitIdentity, IsTheUserWhereTheLogNameIsSetToo)
-{
-    setVariable("USER", "builder");
-    setVariable("LOGNAME", "logger");
-    EXPECT_EQ(identityAfterCommit(), "builder <builder@" + hostName() + ">");
-}
-
-TEST_F(CommitIdentity, OfAnEmptyUserIsRefusedAndTheLogNameNotAsked)
-{
-    setVariable("USER", "");
-    setVariable("LOGNAME", "logger");
-    expectFailure(emptyIdentity);
-}
-
-TEST_F(CommitIdentity, OfAnEmptyLogNameIsRefused)
-{
-    setVariable("LOGNAME", "");
-    expectFailure(emptyIdentity);
-}
-
 TEST_F(CommitIdentity, OfNobodyIsRefusedByAMessageOfItsOwn)
 {
     const NothingChanges nothing(repository_);
@@ -206,73 +238,20 @@ TEST_F(CommitIdentity, OfNobodyIsRefusedByAMessageOfItsOwn)
     }
 }
 
-TEST_F(CommitIdentity, OfNobodyIsRefusedAlsoWhereOneHalfIsConfigured)
+TEST_F(CommitIdentity, OfNobodyIsRefusedAlsoWithOneHalfAndInAnEmptyRepository)
 {
-    const auto expectRefused = [this]
+    for (const std::string key : {"user.name", "user.email"})
     {
+        configure(key, "ann@example.com");
         const NothingChanges nothing(repository_);
-        EXPECT_THROW(commit(), NoUserNameException);
-    };
-    configure("user.name", "Ann");
-    expectRefused();
-    repository_.git({"config", "--unset", "user.name"});
-    configure("user.email", "ann@example.com");
-    expectRefused();
-}
-
-TEST_F(CommitIdentity, OfNobodyIsRefusedInAnEmptyRepositoryToo)
-{
+        EXPECT_THROW(commit(), NoUserNameException) << key;
+        repository_.git({"config", "--unset", key});
+    }
     const auto empty = makeRepository("empty");
     empty.write("added", "x");
     empty.add({"added"});
     const NothingChanges nothing(empty);
     EXPECT_THROW(commitIn(empty), NoUserNameException);
-}
-
-TEST_F(CommitIdentity, OfAConfiguredEmptyNameIsRefused)
-{
-    setVariable("USER", "builder");
-    configure("user.email", "ann@example.com");
-    for (const std::string &name : {std::string(), std::string("   "), noise})
-    {
-        configure("user.name", name);
-        expectFailure(emptyIdentity);
-    }
-}
-
-TEST_F(CommitIdentity, OfAConfiguredEmptyAddressIsRefused)
-{
-    setVariable("USER", "builder");
-    configure("user.name", "Ann");
-    configure("user.email", "");
-    expectFailure(emptyIdentity);
-}
-
-TEST_F(CommitIdentity, OfAConfiguredNameWithAngleBracketsIsRefused)
-{
-    setVariable("USER", "builder");
-    configure("user.name", "Ann <ann@example.com>");
-    configure("user.email", "ann@example.com");
-    expectFailure(angleBrackets);
-}
-
-TEST_F(CommitIdentity, OfAUserWithAngleBracketsIsRefused)
-{
-    setVariable("USER", "<builder>");
-    expectFailure(angleBrackets);
-}
-
-/// The name of the address is as it was; libgit2 cuts what it takes for noise at the ends.
-TEST_F(CommitIdentity, IsOnlyCleanedUpByLibGit2)
-{
-    setVariable("USER", " the builder" + noise + " ");
-    EXPECT_EQ(identityAfterCommit(), "the builder <the builder" + noise + " @" + hostName() + ">");
-}
-
-TEST_F(CommitIdentity, KeepsTheBytesOfAName)
-{
-    setVariable("USER", "J\xC3\xBCrg");
-    EXPECT_EQ(identityAfterCommit(), "J\xC3\xBCrg <J\xC3\xBCrg@" + hostName() + ">");
 }
 
 TEST_F(CommitIdentity, FailsWithAConfigurationThatCannotBeRead)
@@ -308,14 +287,6 @@ TEST_F(CommitIdentity, HasTheCurrentTimeInTheLocalZone)
             EXPECT_LE(std::stoll(when), after);
         }
     }
-}
-
-TEST_F(CommitIdentity, IsInTheReflogToo)
-{
-    setVariable("USER", "builder");
-    commit();
-    EXPECT_EQ(repository_.line({"log", "--walk-reflogs", "-1", "--format=%gn <%ge>"}),
-              "builder <builder@" + hostName() + ">");
 }
 
 } // namespace

@@ -2,6 +2,7 @@
 #include <cstddef>
 #include <memory>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include <gmock/gmock.h>
@@ -14,12 +15,11 @@ namespace
 
 using testing::ElementsAre;
 using testing::MatchesRegex;
-using vclink::test::asUtf16;
-using vclink::test::linesOf;
+using namespace vclink::test;
 
 const std::string identity = R"(Test Person <person@example\.com> [0-9]+ \+0000)";
 
-class CommitMessage : public vclink::test::CommitFixture
+class CommitMessage : public CommitFixture
 {
   protected:
     CommitMessage()
@@ -36,11 +36,6 @@ class CommitMessage : public vclink::test::CommitFixture
         header_ = linesOf(bytes.substr(0, endOfHeader));
         return endOfHeader == std::string::npos ? "no message" : bytes.substr(endOfHeader + 2);
     }
-    void expectUntouched(const std::string &message)
-    {
-        EXPECT_EQ(storedAfter(asUtf16(message)), message);
-    }
-
     std::unique_ptr<vclink::git::GitAdapter> commit_;
     std::vector<std::string> header_;
 };
@@ -62,65 +57,25 @@ TEST_F(CommitMessage, NamesUtf8WhateverTheConfigurationSays)
     EXPECT_EQ(header_.back(), "encoding UTF-8");
 }
 
-TEST_F(CommitMessage, MayBeEmpty)
+/// Empty, blank, with comments for git, control characters and what looks like a header.
+TEST_F(CommitMessage, IsStoredUntouched)
 {
-    expectUntouched("");
+    for (const std::string message :
+         {"", " ", "\n\n\n", "  leading and trailing \t \n\n  \n", "without", "with\n",
+          "with three\n\n\n", "subject\n# no comment\n\n\n\nafter more blank lines than one\n",
+          "one\r\ntwo\rthree\a\x1B[0m\x7F", "tree 0000\nencoding latin1\n\ngpgsig x\n"})
+        EXPECT_EQ(storedAfter(asUtf16(message)), message);
 }
 
-TEST_F(CommitMessage, MayBeBlank)
+TEST_F(CommitMessage, IsUtf8WithTheBytesThatLoneSurrogatesStandFor)
 {
-    expectUntouched(" ");
-    expectUntouched("\n\n\n");
-}
-
-TEST_F(CommitMessage, KeepsItsBlanksAtBothEnds)
-{
-    expectUntouched("  leading and trailing \t \n\n  \n");
-}
-
-TEST_F(CommitMessage, GetsNoLineFeedAtItsEndAndLosesNone)
-{
-    expectUntouched("without");
-    expectUntouched("with\n");
-    expectUntouched("with three\n\n\n");
-}
-
-TEST_F(CommitMessage, KeepsLinesThatGitWouldTakeForComments)
-{
-    expectUntouched("subject\n# no comment\n\n\n\nafter more blank lines than one\n");
-}
-
-TEST_F(CommitMessage, KeepsCarriageReturnsAndControlCharacters)
-{
-    expectUntouched("one\r\ntwo\rthree\a\x1B[0m\x7F");
-}
-
-TEST_F(CommitMessage, KeepsALineThatLooksLikeAHeader)
-{
-    expectUntouched("tree 0000\nencoding latin1\n\ngpgsig x\n");
-}
-
-TEST_F(CommitMessage, IsUtf8)
-{
-    EXPECT_EQ(storedAfter(u"\u00E9\u20AC\uFEFF\uFFFD"), "\xC3\xA9\xE2\x82\xAC\xEF\xBB\xBF\xEF\xBF"
-                                                        "\xBD");
-}
-
-TEST_F(CommitMessage, KeepsCharactersBeyondTheBasicPlane)
-{
-    EXPECT_EQ(storedAfter(u"\U0001F600 \U0010FFFF"), "\xF0\x9F\x98\x80 \xF4\x8F\xBF\xBF");
-}
-
-TEST_F(CommitMessage, HoldsTheByteThatALoneSurrogateStandsFor)
-{
-    EXPECT_EQ(storedAfter({u'a', 0xDC80, u'b', 0xDCFF}), "a\x80"
-                                                         "b\xFF");
-}
-
-TEST_F(CommitMessage, HoldsOtherLoneSurrogatesAsThreeBytes)
-{
-    EXPECT_EQ(storedAfter({u'a', 0xD800, u'b', 0xDFFF}), "a\xED\xA0\x80"
-                                                         "b\xED\xBF\xBF");
+    const std::vector<std::pair<ustring, std::string>> messages{
+        {u"\u00E9\u20AC\uFEFF\uFFFD", "\xC3\xA9\xE2\x82\xAC\xEF\xBB\xBF\xEF\xBF\xBD"},
+        {u"\U0001F600 \U0010FFFF", "\xF0\x9F\x98\x80 \xF4\x8F\xBF\xBF"},
+        {{u'x', 0xDC80, u'y', 0xDCFF}, "x\x80y\xFF"},
+        {{u'x', 0xD800, u'y', 0xDFFF}, "x\xED\xA0\x80y\xED\xBF\xBF"}};
+    for (const auto &[message, bytes] : messages)
+        EXPECT_EQ(storedAfter(message), bytes);
 }
 
 TEST_F(CommitMessage, OfAMebibyteIsWhole)

@@ -5,6 +5,7 @@
 #include <gtest/gtest.h>
 
 #include "main/AdapterFixture.hpp"
+#include "support/Sentence.hpp"
 
 namespace
 {
@@ -53,42 +54,41 @@ class ConflictStates : public vclink::test::AdapterFixture
     vclink::test::GitRepository repository_ = makeRepository();
 };
 
-TEST_F(ConflictStates, OfAFileThatBothChanged)
+struct ConflictRow : vclink::test::Sentence
 {
-    ASSERT_EQ(merge("base\n", "ours\n", "theirs\n"), "UU");
+    std::optional<std::string> base;
+    std::optional<std::string> ours;
+    std::optional<std::string> theirs;
+    std::string letters;
+};
+
+class ConflictState : public ConflictStates, public testing::WithParamInterface<ConflictRow>
+{
+};
+
+TEST_P(ConflictState, IsInConflict)
+{
+    ASSERT_EQ(merge(GetParam().base, GetParam().ours, GetParam().theirs), GetParam().letters);
     expectConflict();
 }
 
-TEST_F(ConflictStates, OfAFileThatBothAdded)
-{
-    ASSERT_EQ(merge({}, "ours\n", "theirs\n"), "AA");
-    expectConflict();
-}
+const ConflictRow conflictRows[]{
+    {{"BothChanged"}, "base\n", "ours\n", "theirs\n", "UU"},
+    {{"BothAdded"}, {}, "ours\n", "theirs\n", "AA"},
+    {{"TheyDeleted"}, "base\n", "ours\n", {}, "UD"},
+    {{"WeDeleted"}, "base\n", {}, "theirs\n", "DU"},
+};
 
-TEST_F(ConflictStates, OfAFileThatTheyDeleted)
-{
-    ASSERT_EQ(merge("base\n", "ours\n", {}), "UD");
-    expectConflict();
-}
+INSTANTIATE_TEST_SUITE_P(OfAFileThat, ConflictState, testing::ValuesIn(conflictRows),
+                         testing::PrintToStringParamName());
 
-TEST_F(ConflictStates, OfAFileThatWeDeleted)
-{
-    ASSERT_EQ(merge("base\n", {}, "theirs\n"), "DU");
-    expectConflict();
-}
-
-TEST_F(ConflictStates, StandsWhateverIsOnDisk)
+TEST_F(ConflictStates, StandsWhateverIsOnDiskUntilTheFileIsStaged)
 {
     ASSERT_EQ(merge("base\n", "ours\n", "theirs\n"), "UU");
     repository_.remove("file");
     expectConflict();
     repository_.write("file", "ours\n");
     expectConflict();
-}
-
-TEST_F(ConflictStates, EndsWhenTheFileIsStaged)
-{
-    ASSERT_EQ(merge("base\n", "ours\n", "theirs\n"), "UU");
     repository_.write("file", "merged\n");
     repository_.add({"file"});
     EXPECT_EQ(states(repository_, {"file"}), (States{{"file", "Modified"}}));

@@ -22,9 +22,7 @@ using testing::ElementsAre;
 using testing::IsEmpty;
 using vclink::FileState;
 using vclink::FileStateMap;
-using vclink::test::asBytes;
-using vclink::test::expectRefusal;
-using vclink::test::NothingChanges;
+using namespace vclink::test;
 
 /// Answers the query for the states of a list by itself.
 class AnsweringAdapter : public vclink::git::GitAdapter
@@ -48,7 +46,7 @@ class AnsweringAdapter : public vclink::git::GitAdapter
 };
 
 /// A class derived from the adapter that overrides the state query.
-class DerivedAdapter : public vclink::test::StagingFixture
+class DerivedAdapter : public StagingFixture
 {
   protected:
     void answer(const std::map<std::string, FileState::State> &states)
@@ -58,15 +56,19 @@ class DerivedAdapter : public vclink::test::StagingFixture
             adapter_.answer.emplace(files({name}).front(), FileState(state));
     }
 
-    AnsweringAdapter adapter_{vclink::test::asPath(repository_.path()),
+    AnsweringAdapter adapter_{asPath(repository_.path()),
                               std::static_pointer_cast<vclink::ApplicationInteractor>(interactor_)};
 };
 
-TEST_F(DerivedAdapter, DecidesWhatIsRefusedAnAddition)
+TEST_F(DerivedAdapter, DecidesWhatIsRefusedAndThatNothingIsLeftToDo)
 {
     repository_.write("new", "x");
-    answer({{"new", FileState::Clean}, {"other", FileState::Unversioned}});
     const NothingChanges nothing(repository_);
+    answer({});
+    adapter_.addFiles(files({"new"}));
+    answer({{"file", FileState::Deleted}});
+    EXPECT_THROW(adapter_.removeFiles(files({"file"})), vclink::git::TagException<NoFilesToRemove>);
+    answer({{"new", FileState::Clean}, {"other", FileState::Unversioned}});
     expectRefusal<AlreadyAdded>(inRoot({"new"}), [this] { adapter_.addFiles(files({"new"})); });
 }
 
@@ -77,21 +79,6 @@ TEST_F(DerivedAdapter, DecidesWhatIsAdded)
     answer({{"file", FileState::Unversioned}});
     adapter_.addFiles(files({"new"}));
     EXPECT_THAT(status(), ElementsAre("M  file", "?? new"));
-}
-
-TEST_F(DerivedAdapter, DecidesThatNothingIsAdded)
-{
-    repository_.write("new", "x");
-    answer({});
-    const NothingChanges nothing(repository_);
-    adapter_.addFiles(files({"new"}));
-}
-
-TEST_F(DerivedAdapter, DecidesThatNothingIsLeftToRemove)
-{
-    answer({{"file", FileState::Deleted}});
-    const NothingChanges nothing(repository_);
-    EXPECT_THROW(adapter_.removeFiles(files({"file"})), vclink::git::TagException<NoFilesToRemove>);
 }
 
 TEST_F(DerivedAdapter, DecidesWhatIsRemoved)
@@ -127,14 +114,13 @@ TEST_F(DerivedAdapter, MayTellOfFilesThatAreNone)
 {
     repository_.write("file", "edited");
     adapter_.answer.emplace(upath(), FileState(FileState::Modified));
-    adapter_.answer.emplace(vclink::test::asPath("/"), FileState(FileState::Modified));
-    adapter_.answer.emplace(vclink::test::asPath(repository_.path()),
-                            FileState(FileState::Modified));
+    adapter_.answer.emplace(asPath("/"), FileState(FileState::Modified));
+    adapter_.answer.emplace(asPath(repository_.path()), FileState(FileState::Modified));
     adapter_.revertFiles(files({"file"}));
     EXPECT_THAT(status(), ElementsAre());
 }
 
-TEST_F(DerivedAdapter, IsAskedOnceAboutTheWholeList)
+TEST_F(DerivedAdapter, IsAskedOnceAboutTheWholeListAlsoAnEmptyOne)
 {
     repository_.write("new", "x");
     answer({{"new", FileState::Unversioned}});
@@ -143,17 +129,12 @@ TEST_F(DerivedAdapter, IsAskedOnceAboutTheWholeList)
     adapter_.removeFiles(files({"other", "new"}));
     answer({});
     adapter_.revertFiles(files({"sub/inside", "file"}));
-    EXPECT_THAT(adapter_.questions, ElementsAre(inRoot({"new", "file"}), inRoot({"other", "new"}),
-                                                inRoot({"sub/inside", "file"})));
-}
-
-TEST_F(DerivedAdapter, IsAskedAboutAnEmptyListToo)
-{
-    const NothingChanges nothing(repository_);
     adapter_.addFiles({});
     EXPECT_THROW(adapter_.removeFiles({}), vclink::git::TagException<NoFilesToRemove>);
     adapter_.revertFiles({});
-    EXPECT_THAT(adapter_.questions, ElementsAre(IsEmpty(), IsEmpty(), IsEmpty()));
+    EXPECT_THAT(adapter_.questions,
+                ElementsAre(inRoot({"new", "file"}), inRoot({"other", "new"}),
+                            inRoot({"sub/inside", "file"}), IsEmpty(), IsEmpty(), IsEmpty()));
 }
 
 TEST_F(DerivedAdapter, IsNotAskedWhenAFileIsMarkedAsResolved)
@@ -170,8 +151,8 @@ TEST_F(DerivedAdapter, ComesToTheRootAndToThePathsInTurn)
     const std::string root = folder() / "no repository";
     std::filesystem::create_directory(root);
     std::filesystem::create_symlink("loop", root + "/loop");
-    const upath loop = vclink::test::asPath(root + "/loop");
-    AnsweringAdapter adapter(vclink::test::asPath(root),
+    const upath loop = asPath(root + "/loop");
+    AnsweringAdapter adapter(asPath(root),
                              std::static_pointer_cast<vclink::ApplicationInteractor>(interactor_));
     adapter.answer.emplace(loop, FileState(FileState::Unversioned));
     EXPECT_THROW(adapter.addFiles({loop}), vclink::git::LibGit2Exception);

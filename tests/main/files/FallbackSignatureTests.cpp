@@ -22,8 +22,7 @@ using testing::ElementsAre;
 using testing::IsEmpty;
 using testing::StartsWith;
 using vclink::git::makeFallbackSignature;
-using vclink::test::HostName;
-using vclink::test::NothingChanges;
+using namespace vclink::test;
 
 using NoUserNameException = vclink::git::TagException<shared_vclink::git::NoUserName>;
 
@@ -40,7 +39,7 @@ int fail(int error)
     return -1;
 }
 
-class FallbackSignature : public vclink::test::CommitFixture
+class FallbackSignature : public CommitFixture
 {
   protected:
     FallbackSignature()
@@ -51,33 +50,18 @@ class FallbackSignature : public vclink::test::CommitFixture
     }
 };
 
-TEST_F(FallbackSignature, IsTheUserAtTheHostWithoutBlanks)
+TEST_F(FallbackSignature, IsTheUserAtTheHostAndTheCommitsAuthorAndCommitter)
 {
+    const std::string expected = "builder <builder@node7>";
     const HostName host("node7");
-    EXPECT_EQ(textOf(*makeFallbackSignature()), "builder <builder@node7>");
-}
-
-TEST_F(FallbackSignature, IsTheCommitsAuthorAndCommitter)
-{
-    const HostName host("node7");
+    EXPECT_EQ(textOf(*makeFallbackSignature()), expected);
+    EXPECT_THAT(host.variables, ElementsAre("USER"));
+    EXPECT_THAT(host.sizes, ElementsAre(1024U));
     commit();
     EXPECT_EQ(repository_.line({"log", "-1", "--format=%an <%ae>, %cn <%ce>"}),
-              "builder <builder@node7>, builder <builder@node7>");
-}
-
-TEST_F(FallbackSignature, IsWhatARepositoryWithoutAnIdentityGives)
-{
-    const HostName host("node7");
-    const auto repository =
-        vclink::git::openRepository(vclink::test::asPath(repository_.path().string()));
-    EXPECT_EQ(textOf(*vclink::git::makeSignature(repository.get())), "builder <builder@node7>");
-}
-
-TEST_F(FallbackSignature, DoesNotAskForTheLogNameWhereThereIsAUser)
-{
-    const HostName host("node7");
-    static_cast<void>(makeFallbackSignature());
-    EXPECT_THAT(host.variables, ElementsAre("USER"));
+              expected + ", " + expected);
+    const auto repository = vclink::git::openRepository(asPath(repository_.path().string()));
+    EXPECT_EQ(textOf(*vclink::git::makeSignature(repository.get())), expected);
 }
 
 TEST_F(FallbackSignature, DoesNotAskForTheLogNameWhereTheUserIsEmpty)
@@ -116,67 +100,35 @@ TEST_F(FallbackSignature, IsNotAskedForWhereTheIdentityIsConfigured)
     EXPECT_THAT(host.sizes, IsEmpty());
 }
 
-TEST_F(FallbackSignature, AsksForTheHostOnceWithABufferOf1024Bytes)
+TEST_F(FallbackSignature, TakesTheHostWholeAndDoesNotCompleteIt)
 {
-    const HostName host("node7");
-    static_cast<void>(makeFallbackSignature());
-    EXPECT_THAT(host.sizes, ElementsAre(1024U));
+    for (const std::string &name :
+         {std::string("node7.example.com"), std::string(1023, 'h'), std::string()})
+    {
+        const HostName host(name);
+        EXPECT_EQ(textOf(*makeFallbackSignature()), "builder <builder@" + name + '>');
+    }
 }
 
-TEST_F(FallbackSignature, DoesNotCompleteTheHost)
-{
-    const HostName host("node7.example.com");
-    EXPECT_EQ(textOf(*makeFallbackSignature()), "builder <builder@node7.example.com>");
-}
-
-TEST_F(FallbackSignature, TakesTheHostUpToTheFirstNul)
+TEST_F(FallbackSignature, TakesTheHostUpToTheFirstNulAndNoErrorOfASuccessForAFailure)
 {
     const HostName host(
         [](char *buffer, std::size_t size)
         {
             std::memset(buffer, 'x', size);
             std::strcpy(buffer, "node7");
+            errno = EIO;
             return 0;
         });
     EXPECT_EQ(textOf(*makeFallbackSignature()), "builder <builder@node7>");
-}
-
-TEST_F(FallbackSignature, TakesTheLongestHostWhole)
-{
-    const HostName host(std::string(1023, 'h'));
-    EXPECT_EQ(makeFallbackSignature()->email, "builder@" + std::string(1023, 'h'));
-}
-
-TEST_F(FallbackSignature, MayHaveAnEmptyHost)
-{
-    const HostName host("");
-    EXPECT_EQ(textOf(*makeFallbackSignature()), "builder <builder@>");
-}
-
-TEST_F(FallbackSignature, HasAnEmptyHostWhereItsNameFailsForNoReason)
-{
-    const HostName host([](char *, std::size_t) { return fail(0); });
-    EXPECT_EQ(textOf(*makeFallbackSignature()), "builder <builder@>");
 }
 
 TEST_F(FallbackSignature, DoesNotMistakeAnEarlierErrorForTheHostsOne)
 {
     const HostName host([](char *, std::size_t) { return fail(0); });
     errno = EIO;
-    EXPECT_EQ(textOf(*makeFallbackSignature()), "builder <builder@>");
+    EXPECT_EQ(textOf(*makeFallbackSignature()), "builder <builder@>") << "and none of its own";
     EXPECT_THAT(host.errors, ElementsAre(0));
-}
-
-TEST_F(FallbackSignature, DoesNotMistakeAnErrorOfASuccessForAFailure)
-{
-    const HostName host(
-        [](char *buffer, std::size_t)
-        {
-            std::strcpy(buffer, "node7");
-            errno = EIO;
-            return 0;
-        });
-    EXPECT_EQ(textOf(*makeFallbackSignature()), "builder <builder@node7>");
 }
 
 TEST_F(FallbackSignature, RaisesTheReasonForWhichTheHostsNameFails)
@@ -214,7 +166,7 @@ TEST_F(FallbackSignature, IsRefusedWithAHostThatNoAddressMayHold)
     repository_.write("file", "changed\n");
     const NothingChanges nothing(repository_);
     const HostName host("<node7>");
-    EXPECT_EQ(vclink::test::failureOf([this] { commit(); }).errorClass, GIT_ERROR_INVALID);
+    EXPECT_EQ(failureOf([this] { commit(); }).errorClass, GIT_ERROR_INVALID);
 }
 
 } // namespace

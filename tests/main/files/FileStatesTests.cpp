@@ -14,11 +14,10 @@ namespace
 {
 
 namespace fs = std::filesystem;
-using vclink::test::asPath;
-using vclink::test::States;
+using namespace vclink::test;
 
 /// The states of single files, of a tree with one committed file.
-class FileStates : public vclink::test::AdapterFixture
+class FileStates : public AdapterFixture
 {
   protected:
     FileStates()
@@ -36,7 +35,7 @@ class FileStates : public vclink::test::AdapterFixture
         EXPECT_EQ(inTheTree[name], state) << name << " in the tree";
     }
 
-    vclink::test::GitRepository repository_ = makeRepository();
+    GitRepository repository_ = makeRepository();
 };
 
 /// What is done in a script of the shell, and the state of a file then, in a list and in the tree.
@@ -59,7 +58,7 @@ class StateOf : public FileStates, public testing::WithParamInterface<StateCase>
 
 TEST_P(StateOf, Is)
 {
-    vclink::test::runScript(repository_, GetParam().script);
+    runScript(repository_, GetParam().script);
     expectState(GetParam().name, GetParam().state);
 }
 
@@ -204,8 +203,7 @@ TEST_F(FileStates, AreReadAfreshEachTime)
 {
     const auto adapter = makeAdapter(repository_.path());
     const std::vector<upath> files{asPath(repository_ / "file")};
-    const auto state = [&]
-    { return vclink::test::nameOf(adapter->getFileStates(files).begin()->second); };
+    const auto state = [&] { return nameOf(adapter->getFileStates(files).begin()->second); };
     EXPECT_EQ(state(), "Clean");
     repository_.write("file", "edited\n");
     EXPECT_EQ(state(), "Modified");

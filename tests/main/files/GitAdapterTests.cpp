@@ -11,7 +11,6 @@
 
 #include "main/AdapterFixture.hpp"
 #include "main/TestOptionsFactory.hpp"
-#include "support/Descriptors.hpp"
 #include "support/Failure.hpp"
 #include "support/LibGit2Session.hpp"
 #include "support/text.hpp"
@@ -23,13 +22,9 @@ namespace
 using vclink::ApplicationInteractor;
 using vclink::exception::SourceControlException;
 using vclink::git::GitAdapter;
-using vclink::test::asPath;
-using vclink::test::asUtf8;
-using vclink::test::countLibGit2Starts;
-using vclink::test::failureOf;
-using vclink::test::TestOptionsFactory;
+using namespace vclink::test;
 
-class GitAdapterTest : public vclink::test::AdapterFixture
+class GitAdapterTest : public AdapterFixture
 {
 };
 
@@ -39,20 +34,14 @@ TEST_F(GitAdapterTest, GivesBackTheVeryRootItWasGiven)
     {
         for (const bool native : {true, false})
         {
-            GitAdapter adapter(upath(text, native),
-                               std::static_pointer_cast<ApplicationInteractor>(interactor_));
+            const upath given(text, native);
+            GitAdapter adapter(given, std::static_pointer_cast<ApplicationInteractor>(interactor_));
+            EXPECT_NE(&adapter.getRootFolder(), &given);
+            EXPECT_EQ(&adapter.getRootFolder(), &adapter.getRootFolder());
             EXPECT_EQ(adapter.getRootFolder().string(), text);
             EXPECT_EQ(adapter.getRootFolder().native(), native);
         }
     }
-}
-
-TEST_F(GitAdapterTest, GivesItsOwnRootAndNoOther)
-{
-    const upath given = asPath(folder().path());
-    GitAdapter adapter(given, std::static_pointer_cast<ApplicationInteractor>(interactor_));
-    EXPECT_NE(&adapter.getRootFolder(), &given);
-    EXPECT_EQ(&adapter.getRootFolder(), &adapter.getRootFolder());
 }
 
 TEST_F(GitAdapterTest, GivesTheRootAfterAnyOperation)
@@ -88,7 +77,6 @@ TEST_F(GitAdapterTest, OpensARepositoryOfItsOwnForEachCaller)
 TEST_F(GitAdapterTest, RaisesWhereItsRepositoryCannotBeOpened)
 {
     const auto adapter = makeAdapter(folder() / "missing");
-    const vclink::test::NoDescriptorLeak noLeak;
     EXPECT_EQ(failureOf([&] { static_cast<void>(adapter->getRepository()); }).code, GIT_ENOTFOUND);
 }
 
@@ -104,15 +92,13 @@ TEST_F(GitAdapterTest, SharesTheFactoryAndTheInteractor)
     EXPECT_EQ(adapter.getInteractor(), factory->getInteractor());
     // This test, the factory, the callbacks and the adapter.
     EXPECT_EQ(interactor_.use_count(), 4);
-}
-
-TEST_F(GitAdapterTest, MakesADefaultFactoryForAnInteractor)
-{
-    const auto adapter = makeAdapter(folder().path());
-    EXPECT_EQ(adapter->getOptionsFactory()->getInteractor(), interactor_);
-    EXPECT_EQ(adapter->getInteractor(), interactor_);
+    const auto withDefaults = makeAdapter(folder().path());
+    EXPECT_EQ(withDefaults->getOptionsFactory()->getInteractor(), interactor_);
+    EXPECT_EQ(withDefaults->getInteractor(), interactor_);
     // The adapter's own share, and the one asked for here.
-    EXPECT_EQ(adapter->getOptionsFactory().use_count(), 2);
+    EXPECT_EQ(withDefaults->getOptionsFactory().use_count(), 2);
+    EXPECT_FALSE(std::is_copy_constructible_v<GitAdapter>);
+    EXPECT_FALSE(std::is_copy_assignable_v<GitAdapter>);
 }
 
 TEST_F(GitAdapterTest, OwnsOneObjectOfCallbacks)
@@ -145,7 +131,7 @@ TEST_F(GitAdapterTest, EndsTheGuardLast)
     const int before = countLibGit2Starts();
     int startsAtTheFactorysEnd = 0;
     long sharesAtTheFactorysEnd = 0;
-    auto interactor = std::make_shared<vclink::test::TestInteractor>();
+    auto interactor = std::make_shared<TestInteractor>();
     auto factory = std::make_shared<TestOptionsFactory>(interactor);
     factory->onDestruction = [&, watched = std::weak_ptr<ApplicationInteractor>(interactor)]
     {
@@ -160,21 +146,6 @@ TEST_F(GitAdapterTest, EndsTheGuardLast)
     // Its own.
     EXPECT_EQ(sharesAtTheFactorysEnd, 1);
     EXPECT_EQ(countLibGit2Starts(), before);
-}
-
-TEST_F(GitAdapterTest, CannotBeCopied)
-{
-    EXPECT_FALSE(std::is_copy_constructible_v<GitAdapter>);
-    EXPECT_FALSE(std::is_copy_assignable_v<GitAdapter>);
-}
-
-TEST_F(GitAdapterTest, TakesSeveralShortLivesWithoutLeavingADescriptor)
-{
-    const auto repository = makeRepository();
-    makeAdapter(repository.path())->getFolderStates(asPath(repository.path()));
-    const vclink::test::NoDescriptorLeak noLeak;
-    for (int i = 0; i < 20; ++i)
-        makeAdapter(repository.path())->getFolderStates(asPath(repository.path()));
 }
 
 } // namespace

@@ -1,5 +1,4 @@
 // SPDX-License-Identifier: MIT
-#include <string>
 
 #include <boost/filesystem/exception.hpp>
 #include <gtest/gtest.h>
@@ -10,11 +9,10 @@
 namespace
 {
 
-using vclink::test::asPath;
-using vclink::test::States;
+using namespace vclink::test;
 
 /// Symbolic links in a working copy.
-class LinkStates : public vclink::test::AdapterFixture
+class LinkStates : public AdapterFixture
 {
   protected:
     LinkStates()
@@ -27,7 +25,7 @@ class LinkStates : public vclink::test::AdapterFixture
         repository_.commitAll("first");
     }
 
-    vclink::test::GitRepository repository_ = makeRepository();
+    GitRepository repository_ = makeRepository();
 };
 
 TEST_F(LinkStates, AreThoseOfTheLinksInAFolder)

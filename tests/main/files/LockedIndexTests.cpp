@@ -20,15 +20,10 @@ namespace
 
 namespace fs = std::filesystem;
 using testing::HasSubstr;
-using vclink::test::asPath;
-using vclink::test::failureOf;
-using vclink::test::LogCapture;
-using vclink::test::LogRecord;
-using vclink::test::NothingChanges;
-using vclink::test::textOf;
+using namespace vclink::test;
 
 /// Operations beside those of other processes, and of the host's callbacks.
-class LockedIndex : public vclink::test::MergeFixture
+class LockedIndex : public MergeFixture
 {
   protected:
     upath path(const std::string &name) const
@@ -122,30 +117,29 @@ TEST_F(LockedIndex, LeavesABranchThatHasMovedSinceItsFastForwardWasDecided)
     EXPECT_EQ(parents().size(), 2U);
 }
 
-TEST_F(LockedIndex, LeavesAMergeThatHasBegunSinceItsOwnWasDecided)
-{
-    makeDiverged();
-    makeBranch("third", writing("third", "x"), "main^");
-    const std::string failure = mergeMeeting(
-        [this] {
-            repository_.git({"merge", "--quiet", "--no-commit", "third"});
-        });
-    EXPECT_EQ(failure, textOf(shared_vclink::git::UnableToMergeBadRepositoryState()));
-    EXPECT_EQ(repository_.line({"rev-parse", "MERGE_HEAD"}), idOf("third"));
-    EXPECT_TRUE(fs::exists(repository_ / "third"));
-    EXPECT_FALSE(fs::exists(repository_ / "theirs"));
-}
-
-TEST_F(LockedIndex, LeavesAMergeThatHasBegunSinceItsFastForwardWasDecided)
+TEST_F(LockedIndex, LeavesAMergeThatHasBegunSinceItsOwnOrItsFastForwardWasDecided)
 {
     makeAhead();
     makeBranch("third", writing("third", "x"), "main");
-    const std::string failure = mergeMeeting(
-        [this] {
-            repository_.git({"merge", "--quiet", "--no-ff", "--no-commit", "third"});
-        });
-    EXPECT_EQ(failure, textOf(shared_vclink::git::UnableToMergeBadRepositoryState()));
-    EXPECT_EQ(idOf("main"), idOf("topic^"));
+    for (const bool isDiverged : {false, true})
+    {
+        if (isDiverged)
+        {
+            repository_.git({"merge", "--abort"});
+            repository_.write("ours", "x");
+            repository_.commitAll("on main");
+        }
+        const std::string ours = idOf("main");
+        const std::string failure = mergeMeeting(
+            [this] {
+                repository_.git({"merge", "--quiet", "--no-ff", "--no-commit", "third"});
+            });
+        EXPECT_EQ(failure, textOf(shared_vclink::git::UnableToMergeBadRepositoryState()));
+        EXPECT_EQ(idOf("main"), ours);
+        EXPECT_EQ(repository_.line({"rev-parse", "MERGE_HEAD"}), idOf("third"));
+        EXPECT_TRUE(fs::exists(repository_ / "third"));
+        EXPECT_FALSE(fs::exists(repository_ / "new"));
+    }
 }
 
 /// As after `git clone --no-checkout`: libgit2 then checks everything out.
@@ -154,7 +148,7 @@ TEST_F(LockedIndex, IsNotThereBeforeTheFirstCheckout)
     makeAhead();
     const auto target = folder() / "clone";
     repository_.git({"clone", "--quiet", "--no-checkout", ".", target.string()});
-    const vclink::test::GitRepository clone(target);
+    const GitRepository clone(target);
     clone.git({"branch", "--quiet", "topic", "origin/topic"});
     ASSERT_FALSE(fs::exists(clone / ".git/index"));
     const auto adapter = makeAdapter(clone.path());

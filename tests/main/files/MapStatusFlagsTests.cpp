@@ -1,7 +1,5 @@
 // SPDX-License-Identifier: MIT
 #include <array>
-#include <string>
-#include <vector>
 
 #include <git2.h>
 #include <gtest/gtest.h>
@@ -55,28 +53,6 @@ TEST(MapStatusFlags, GivesEachOfLibGit2sBitsItsState)
          {GIT_STATUS_INDEX_RENAMED, GIT_STATUS_INDEX_TYPECHANGE, GIT_STATUS_WT_TYPECHANGE,
           GIT_STATUS_WT_RENAMED, GIT_STATUS_WT_UNREADABLE, GIT_STATUS_IGNORED})
         EXPECT_EQ(mapStatusFlags(bit), FileState::Unknown) << bit;
-}
-
-TEST(MapStatusFlags, LetsNewInTheIndexBeatEditedSince)
-{
-    EXPECT_EQ(mapStatusFlags(GIT_STATUS_INDEX_NEW | GIT_STATUS_WT_MODIFIED), FileState::Added);
-    EXPECT_EQ(mapStatusFlags(GIT_STATUS_INDEX_NEW | GIT_STATUS_WT_DELETED), FileState::Added);
-}
-
-TEST(MapStatusFlags, LetsChangedInTheIndexBeatGoneFromTheTree)
-{
-    EXPECT_EQ(mapStatusFlags(GIT_STATUS_INDEX_MODIFIED | GIT_STATUS_WT_DELETED),
-              FileState::Modified);
-}
-
-TEST(MapStatusFlags, LetsRemovedFromTheIndexBeatStillOnDisk)
-{
-    EXPECT_EQ(mapStatusFlags(GIT_STATUS_INDEX_DELETED | GIT_STATUS_WT_NEW), FileState::Deleted);
-}
-
-TEST(MapStatusFlags, LetsAConflictBeatEverything)
-{
-    EXPECT_EQ(mapStatusFlags(GIT_STATUS_CONFLICTED | 0x7FFF), FileState::InConflict);
 }
 
 TEST(MapStatusFlags, GivesTheNumbersThatTheHostKnows)

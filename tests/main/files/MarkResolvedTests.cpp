@@ -1,139 +1,94 @@
 // SPDX-License-Identifier: MIT
 #include <filesystem>
-#include <functional>
 #include <string>
+#include <vector>
 
-#include <boost/filesystem/exception.hpp>
-#include <git2.h>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include "StagingFixture.hpp"
+#include "support/Sentence.hpp"
 
 namespace
 {
 
 namespace fs = std::filesystem;
 using testing::ElementsAre;
-using vclink::test::asPath;
-using vclink::test::failureOf;
-using vclink::test::indexOf;
-using vclink::test::NothingChanges;
-using vclink::test::RepositoryState;
-using vclink::test::States;
+using namespace vclink::test;
 
-class MarkResolved : public vclink::test::StagingFixture
+class MarkResolved : public StagingFixture
 {
 };
 
-TEST_F(MarkResolved, PutsTheFileAsItStandsIntoThePlaceOfAConflict)
+TEST_F(MarkResolved, PutsWhatStandsOrItsAbsenceIntoThePlaceOfAConflict)
 {
-    beginMerge({"conflicted", "left"});
-    repository_.write("conflicted", "merged\n");
-    const RepositoryState expected = stateAfterGit({{"add", "conflicted"}});
-    markResolved("conflicted");
+    beginMerge({"gone", "left", "markers", "merged", "ours"});
+    repository_.write("merged", "merged\n");
+    repository_.write("ours", "ours\n");
+    repository_.remove("gone");
+    const std::vector<std::string> names{"gone", "markers", "merged", "ours"};
+    RepositoryState expected = stateAfterGit(
+        {{"rm", "--quiet", "--cached", "gone"}, {"add", "markers", "merged", "ours"}});
+    EXPECT_EQ(expected.underWay.count("MERGE_HEAD"), 1U);
+    for (const auto &name : names)
+        markResolved(name);
     EXPECT_EQ(stateOf(repository_), expected);
-    EXPECT_EQ(states(repository_, {"conflicted", "left"}),
-              (States{{"conflicted", "Modified"}, {"left", "InConflict"}}));
+    EXPECT_EQ(states(repository_, names), (States{{"gone", "Deleted"},
+                                                  {"markers", "Modified"},
+                                                  {"merged", "Modified"},
+                                                  {"ours", "Clean"}}));
+    EXPECT_EQ(states(repository_, {"left"}), (States{{"left", "InConflict"}}));
+    EXPECT_NE(repository_.git({"show", ":markers"}).find("<<<<<<<"), std::string::npos);
 }
 
-TEST_F(MarkResolved, TakesTheMarkersOfAConflictAlong)
+/// A merge in which one side deleted "file" and the other edited it: whether ours did, whether the
+/// file stands when it is marked, and what git's status is then.
+struct DeletionRow : Sentence
 {
-    beginMerge({"conflicted"});
-    markResolved("conflicted");
-    EXPECT_NE(repository_.git({"show", ":conflicted"}).find("<<<<<<<"), std::string::npos);
-}
+    bool isOurs;
+    bool stands;
+    std::vector<std::string> status;
+};
 
-TEST_F(MarkResolved, TakesOurSideForNoChange)
+class MarkResolvedOfADeletion : public MarkResolved, public testing::WithParamInterface<DeletionRow>
 {
-    beginMerge({"conflicted"});
-    repository_.write("conflicted", "ours\n");
-    markResolved("conflicted");
-    EXPECT_THAT(status(), ElementsAre());
-}
+};
 
-TEST_F(MarkResolved, LeavesTheMergeUnderWay)
+TEST_P(MarkResolvedOfADeletion, Takes)
 {
-    beginMerge({"conflicted"});
-    const RepositoryState before = stateOf(repository_);
-    markResolved("conflicted");
-    const RepositoryState after = stateOf(repository_);
-    EXPECT_EQ(after.underWay, before.underWay);
-    EXPECT_EQ(after.underWay.count("MERGE_HEAD"), 1U);
-    EXPECT_EQ(after.head, before.head);
-    EXPECT_EQ(after.workingTree, before.workingTree);
-}
-
-TEST_F(MarkResolved, PutsTheAbsenceOfAFileIntoThePlaceOfAConflict)
-{
-    beginMerge({"conflicted", "left"});
-    repository_.remove("conflicted");
-    const RepositoryState expected = stateAfterGit({{"rm", "--cached", "conflicted"}});
-    markResolved("conflicted");
-    EXPECT_EQ(stateOf(repository_), expected);
-    EXPECT_EQ(states(repository_, {"conflicted"}), (States{{"conflicted", "Deleted"}}));
-}
-
-/// A merge in which one side deleted what the other edited.
-class MarkResolvedOfADeletion : public MarkResolved
-{
-  protected:
-    void mergeAfter(const std::function<void()> &ours, const std::function<void()> &theirs)
+    const auto commitSide = [this](bool isDeleted)
     {
-        repository_.git({"branch", "theirs"});
-        ours();
-        repository_.commitAll("ours");
-        repository_.git({"checkout", "--quiet", "theirs"});
-        theirs();
-        repository_.commitAll("theirs");
-        repository_.git({"checkout", "--quiet", "main"});
-        repository_.tryGit(
-            {"-c", "user.name=T", "-c", "user.email=t@example.com", "merge", "--quiet", "theirs"});
-        ASSERT_EQ(states(repository_, {"file"}), (States{{"file", "InConflict"}}));
-    }
-    void edit() const
-    {
-        repository_.write("file", "edited\n");
-    }
-    void take() const
-    {
+        if (isDeleted)
+            repository_.remove("file");
+        else
+            repository_.write("file", "edited\n");
+        repository_.commitAll("side");
+    };
+    repository_.git({"branch", "theirs"});
+    commitSide(GetParam().isOurs);
+    repository_.git({"checkout", "--quiet", "theirs"});
+    commitSide(!GetParam().isOurs);
+    repository_.git({"checkout", "--quiet", "main"});
+    repository_.tryGit(
+        {"-c", "user.name=T", "-c", "user.email=t@example.com", "merge", "--quiet", "theirs"});
+    ASSERT_EQ(states(repository_, {"file"}), (States{{"file", "InConflict"}}));
+    ASSERT_TRUE(fs::exists(repository_ / "file"));
+    if (!GetParam().stands)
         repository_.remove("file");
-    }
+    markResolved("file");
+    EXPECT_EQ(status(), GetParam().status);
+    EXPECT_EQ(indexOf(repository_).count("file"), GetParam().stands ? 1U : 0U);
+}
+
+const DeletionRow deletionRows[]{
+    {{"OurFileThatTheyDeletedWhileItStands"}, false, true, {}},
+    {{"TheirDeletionWhenTheFileIsGone"}, false, false, {"D  file"}},
+    {{"TheirFileThatWeDeletedWhileItStands"}, true, true, {"A  file"}},
+    {{"OurDeletionWhenTheFileIsGone"}, true, false, {}},
 };
 
-TEST_F(MarkResolvedOfADeletion, KeepsTheFileThatTheyDeletedWhileItStands)
-{
-    mergeAfter([this] { edit(); }, [this] { take(); });
-    ASSERT_TRUE(fs::exists(repository_ / "file"));
-    markResolved("file");
-    EXPECT_THAT(status(), ElementsAre());
-    EXPECT_EQ(repository_.git({"show", ":file"}), "edited\n");
-}
-
-TEST_F(MarkResolvedOfADeletion, AcceptsTheirDeletionWhenTheFileIsGone)
-{
-    mergeAfter([this] { edit(); }, [this] { take(); });
-    repository_.remove("file");
-    markResolved("file");
-    EXPECT_THAT(status(), ElementsAre("D  file"));
-}
-
-TEST_F(MarkResolvedOfADeletion, BringsBackTheFileThatWeDeletedWhileItStands)
-{
-    mergeAfter([this] { take(); }, [this] { edit(); });
-    ASSERT_TRUE(fs::exists(repository_ / "file"));
-    markResolved("file");
-    EXPECT_THAT(status(), ElementsAre("A  file"));
-}
-
-TEST_F(MarkResolvedOfADeletion, KeepsOurDeletionWhenTheFileIsGone)
-{
-    mergeAfter([this] { take(); }, [this] { edit(); });
-    repository_.remove("file");
-    markResolved("file");
-    EXPECT_THAT(status(), ElementsAre());
-    EXPECT_EQ(indexOf(repository_).count("file"), 0U);
-}
+INSTANTIATE_TEST_SUITE_P(Merges, MarkResolvedOfADeletion, testing::ValuesIn(deletionRows),
+                         testing::PrintToStringParamName());
 
 TEST_F(MarkResolved, EndsTheConflictOfEachPathOfARenaming)
 {
@@ -155,20 +110,13 @@ TEST_F(MarkResolved, EndsTheConflictOfEachPathOfARenaming)
     EXPECT_EQ(indexOf(repository_).count("old"), 0U);
 }
 
-TEST_F(MarkResolved, SucceedsWithoutAnEffectForAPathThatIsNowhere)
-{
-    const RepositoryState before = stateOf(repository_);
-    EXPECT_NO_THROW(markResolved("missing"));
-    EXPECT_NO_THROW(markResolved("missing/below"));
-    EXPECT_EQ(stateOf(repository_), before);
-}
-
-TEST_F(MarkResolved, AddsNothingOfAnUntrackedFileThatGitIgnores)
+TEST_F(MarkResolved, SucceedsWithoutAnEffectForAPathThatIsNowhereOrIgnored)
 {
     repository_.write(".git/info/exclude", "*.o\n");
     repository_.write("a.o", "x");
     const RepositoryState before = stateOf(repository_);
-    EXPECT_NO_THROW(markResolved("a.o"));
+    for (const auto *name : {"missing", "missing/below", "a.o"})
+        EXPECT_NO_THROW(markResolved(name));
     EXPECT_EQ(stateOf(repository_), before);
 }
 
@@ -184,35 +132,15 @@ TEST_F(MarkResolved, TakesATrackedFileThatIsIgnoredToo)
     EXPECT_EQ(stateOf(repository_), expected);
 }
 
-TEST_F(MarkResolved, StagesAnEditAndANewFile)
+TEST_F(MarkResolved, StagesAnEditANewFileAndADeletion)
 {
     repository_.write("file", "edited\n");
     repository_.write("new", "x");
-    const RepositoryState expected = stateAfterGit({{"add", "file", "new"}});
-    markResolved("file");
-    markResolved("new");
+    repository_.remove("other");
+    const RepositoryState expected = stateAfterGit({{"add", "--all"}});
+    for (const auto *name : {"file", "new", "other"})
+        markResolved(name);
     EXPECT_EQ(stateOf(repository_), expected);
-}
-
-TEST_F(MarkResolved, StagesTheDeletionOfAMissingFile)
-{
-    repository_.remove("file");
-    markResolved("file");
-    EXPECT_THAT(status(), ElementsAre("D  file"));
-}
-
-TEST_F(MarkResolved, TakesAnEmptyPathAndTheRootForNothing)
-{
-    repository_.write("file", "edited\n");
-    repository_.write("new", "x");
-    const RepositoryState before = stateOf(repository_);
-    const auto adapter = makeAdapter(repository_.path());
-    adapter->markResolved(upath());
-    adapter->markResolved(asPath(repository_.path()));
-    adapter->markResolved(asPath(repository_ / "."));
-    adapter->markResolved(asPath("missing/relative"));
-    adapter->markResolved(asPath("/"));
-    EXPECT_EQ(stateOf(repository_), before);
 }
 
 TEST_F(MarkResolved, TakesAFolderForAllBelowIt)
@@ -246,27 +174,14 @@ TEST_F(MarkResolved, TakesALinkThatLeadsNowhereForAnAbsence)
     EXPECT_THAT(status(), ElementsAre("D  link", "?? link"));
 }
 
-TEST_F(MarkResolved, RaisesOnALoopOfLinks)
-{
-    repository_.symlink("loop", "loop");
-    const NothingChanges nothing(repository_);
-    EXPECT_THROW(markResolved("loop"), boost::filesystem::filesystem_error);
-}
-
-TEST_F(MarkResolved, TakesTheFileWhereAFolderStandsNow)
+TEST_F(MarkResolved, TakesFilesAndFoldersThatStandInEachOthersPlaces)
 {
     repository_.remove("file");
     repository_.write("file/inside", "x");
-    const RepositoryState expected = stateAfterGit({{"add", "file"}});
-    markResolved("file");
-    EXPECT_EQ(stateOf(repository_), expected);
-}
-
-TEST_F(MarkResolved, TakesTheFilesOfAFolderWhereAFileStandsNow)
-{
     repository_.remove("sub");
     repository_.write("sub", "x");
-    const RepositoryState expected = stateAfterGit({{"add", "sub"}});
+    const RepositoryState expected = stateAfterGit({{"add", "file", "sub"}});
+    markResolved("file");
     markResolved("sub");
     EXPECT_EQ(stateOf(repository_), expected);
 }
@@ -279,21 +194,11 @@ TEST_F(MarkResolved, TakesTheNewCommitOfASubmodule)
     inner.commit("second");
     repository_.git({"submodule", "--quiet", "add", inner.path().string(), "module"});
     repository_.commit("second");
-    vclink::test::GitRepository(repository_ / "module").git({"checkout", "--quiet", "HEAD~1"});
+    GitRepository(repository_ / "module").git({"checkout", "--quiet", "HEAD~1"});
     const RepositoryState expected = stateAfterGit({{"add", "module"}});
     markResolved("module");
     EXPECT_EQ(indexOf(repository_), expected.index);
     EXPECT_THAT(status(), ElementsAre("M  module"));
-}
-
-TEST_F(MarkResolved, RaisesForAFileThatStandsInABareRepository)
-{
-    const std::string bare = folder() / "bare";
-    repository_.git({"clone", "--quiet", "--bare", repository_.path().string(), bare});
-    const auto adapter = makeAdapter(bare);
-    EXPECT_EQ(failureOf([&] { adapter->markResolved(asPath(bare + "/config")); }).code,
-              GIT_EBAREREPO);
-    EXPECT_FALSE(fs::exists(bare + "/index"));
 }
 
 } // namespace

@@ -24,12 +24,7 @@ using shared_vclink::git::Conflicted;
 using testing::ElementsAre;
 using testing::IsEmpty;
 using vclink::git::TagException;
-using vclink::test::asPath;
-using vclink::test::Failure;
-using vclink::test::failureOf;
-using vclink::test::LibGit2Recorder;
-using vclink::test::ofTheQuery;
-using vclink::test::operator+;
+using namespace vclink::test;
 using Names = std::vector<std::string>;
 
 /// The index is read before, to be sure of it.
@@ -42,7 +37,7 @@ const Names ofTheCheckout{"git_checkout_index"};
 const Names ofTheRelease{"git_object_free", "git_repository_free"};
 
 /// The calls of libgit2 that a revert makes.
-class RevertCalls : public vclink::test::StagingFixture
+class RevertCalls : public StagingFixture
 {
   protected:
     RevertCalls()
@@ -80,8 +75,8 @@ class RevertCalls : public vclink::test::StagingFixture
         adapter_.revertFiles(files(names));
     }
 
-    std::shared_ptr<vclink::test::TestOptionsFactory> factory_ =
-        std::make_shared<vclink::test::TestOptionsFactory>(interactor_);
+    std::shared_ptr<TestOptionsFactory> factory_ =
+        std::make_shared<TestOptionsFactory>(interactor_);
     vclink::git::GitAdapter adapter_{asPath(repository_.path()), factory_};
     LibGit2Recorder calls_;
     Names revisions_;
@@ -93,21 +88,20 @@ class RevertCalls : public vclink::test::StagingFixture
 
 TEST_F(RevertCalls, ResetTheIndexAndCheckItOutWithAChangeOrWithout)
 {
-    for (const auto *name : {"file", "other"})
-    {
-        calls_.clear();
-        revert({name});
-        EXPECT_EQ(calls_.steps(), ofTheReset + ofTheOptions + ofTheCheckout + ofTheRelease);
-        EXPECT_THAT(calls_.openHandles(), IsEmpty());
-    }
-}
-
-TEST_F(RevertCalls, ResetOnceWhereFilesWereOnlyAdded)
-{
+    revert({});
+    EXPECT_THAT(calls_.steps(), IsEmpty());
     repository_.write("new", "x");
     repository_.add({"new"});
-    revert({"new", "file"});
-    EXPECT_THAT(targets_, testing::SizeIs(1));
+    for (const auto &names : {Names{"file"}, Names{"other"}, Names{"new", "file"}})
+    {
+        calls_.clear();
+        targets_.clear();
+        revert(names);
+        EXPECT_EQ(calls_.steps(), ofTheReset + ofTheOptions + ofTheCheckout + ofTheRelease);
+        EXPECT_THAT(targets_, ElementsAre(repository_.line({"rev-parse", "HEAD"})));
+        EXPECT_THAT(calls_.openHandles(), IsEmpty());
+    }
+    EXPECT_THAT(revisions_, testing::Each("HEAD"));
 }
 
 TEST_F(RevertCalls, ResetOnceHoweverTheRootIsWritten)
@@ -133,28 +127,18 @@ TEST_F(RevertCalls, ResetASecondTimeWhereAFileIsLostOnTheWay)
     EXPECT_THAT(calls_.openHandles(), IsEmpty());
 }
 
-TEST_F(RevertCalls, ResetToTheCommitOfHead)
-{
-    revert({"file"});
-    EXPECT_THAT(revisions_, ElementsAre("HEAD"));
-    EXPECT_THAT(targets_, ElementsAre(repository_.line({"rev-parse", "HEAD"})));
-}
-
-TEST_F(RevertCalls, ResetToNothingWithoutAHead)
-{
-    repository_.git({"checkout", "--quiet", "--orphan", "fresh"});
-    revert({"file"});
-    EXPECT_THAT(targets_, ElementsAre("none"));
-    EXPECT_THAT(checkoutFiles_, ElementsAre(ElementsAre("file")));
-    EXPECT_THAT(calls_.openHandles(), IsEmpty());
-}
-
-TEST_F(RevertCalls, ResetToNothingWhyeverHeadFails)
+TEST_F(RevertCalls, ResetToNothingWhyeverHeadFailsOrIsMissing)
 {
     calls_.fail({{"git_revparse_single", GIT_EAUTH}});
     EXPECT_NO_THROW(revert({"file"}));
     EXPECT_THAT(targets_, ElementsAre("none"));
-    EXPECT_EQ(vclink::test::indexOf(repository_).count("file"), 0U);
+    EXPECT_EQ(indexOf(repository_).count("file"), 0U);
+    calls_.fail({});
+    repository_.git({"checkout", "--quiet", "--orphan", "fresh"});
+    revert({"file"});
+    EXPECT_THAT(targets_, ElementsAre("none", "none"));
+    EXPECT_THAT(checkoutFiles_, ElementsAre(ElementsAre("file"), ElementsAre("file")));
+    EXPECT_THAT(calls_.openHandles(), IsEmpty());
 }
 
 TEST_F(RevertCalls, HaveTheFilesOfTheListInItsOrder)
@@ -227,26 +211,6 @@ TEST_F(RevertCalls, PassAnExceptionOfTheFactoryOn)
     EXPECT_THROW(revert({"file"}), std::logic_error);
     EXPECT_THAT(records_, IsEmpty());
     EXPECT_THAT(calls_.openHandles(), IsEmpty());
-}
-
-TEST_F(RevertCalls, OpenTheRootItselfWithoutASearch)
-{
-    Names paths;
-    calls_.on<git_repository_open_ext>(
-        [&](git_repository **, const char *path, unsigned flags, const char *ceilings)
-        {
-            paths.emplace_back(path);
-            EXPECT_EQ(flags, static_cast<unsigned>(GIT_REPOSITORY_OPEN_NO_SEARCH));
-            EXPECT_EQ(ceilings, nullptr);
-        });
-    revert({"file"});
-    EXPECT_THAT(paths, ElementsAre(repository_.path().string(), repository_.path().string()));
-}
-
-TEST_F(RevertCalls, AreNoneForAnEmptyList)
-{
-    revert({});
-    EXPECT_THAT(calls_.steps(), IsEmpty());
 }
 
 TEST_F(RevertCalls, AreThoseOfTheQueryAloneWhereAFileIsInConflict)

@@ -28,10 +28,7 @@ namespace
 namespace git = vclink::git;
 using testing::IsEmpty;
 using testing::SizeIs;
-using vclink::test::LogCapture;
-using vclink::test::LogRecord;
-using vclink::test::RepositoryState;
-using vclink::test::stateOf;
+using namespace vclink::test;
 using vclink::util::exception::CancelledOperationException;
 
 constexpr int fileCount = 300;
@@ -45,7 +42,7 @@ template <class Set> bool pollSees(Set &set)
 }
 
 /// A repository of many files, all of them changed, the first half staged.
-class RevertCancellation : public vclink::test::AdapterFixture
+class RevertCancellation : public AdapterFixture
 {
   protected:
     RevertCancellation()
@@ -77,7 +74,7 @@ class RevertCancellation : public vclink::test::AdapterFixture
         const std::string root = repository_.path().string() + '/';
         std::vector<upath> files;
         for (const auto &name : names_)
-            files.push_back(vclink::test::asPath(root + name));
+            files.push_back(asPath(root + name));
         adapter_->revertFiles(files);
     }
 
@@ -141,54 +138,37 @@ class RevertCancellation : public vclink::test::AdapterFixture
     }
 
     std::vector<std::string> names_;
-    vclink::test::GitRepository repository_ = makeRepository();
+    GitRepository repository_ = makeRepository();
     RepositoryState reverted_;
     RepositoryState changed_;
     const std::unique_ptr<git::GitAdapter> adapter_ = makeAdapter(repository_.path());
 };
 
-TEST_F(RevertCancellation, AskedForBeforeTheStartStopsAtTheFirstNotification)
+TEST_F(RevertCancellation, AskedForBeforeTheStartStopsOneCheckoutThatNotifies)
 {
     interactor_->cancel();
-    const LogCapture log(git::SeverityProgress);
-    expectCancelled();
-    EXPECT_THAT(notifications(log), IsEmpty());
-    EXPECT_THAT(interactor_->progress.calls, IsEmpty());
+    interactor_->cancel();
+    {
+        const LogCapture log(git::SeverityProgress | git::SeverityException |
+                             git::SeverityDiagnostic);
+        expectCancelled();
+        EXPECT_THAT(interactor_->progress.calls, IsEmpty());
+        EXPECT_THAT(
+            log.messages(),
+            testing::ElementsAre(testing::AllOf(testing::StartsWith("Exception caught: "),
+                                                testing::HasSubstr("CancelledOperationException")),
+                                 "Re-throwing error from callback"));
+    }
     expectUnstagedOnly();
     expectUsable();
-}
-
-TEST_F(RevertCancellation, IsForgottenByTheRetry)
-{
-    interactor_->cancel();
-    expectCancelled();
     EXPECT_NO_THROW(revertAll());
     expectReverted();
     expectUsable();
-}
-
-TEST_F(RevertCancellation, AskedForTwiceStopsOnce)
-{
+    // A checkout that has nothing to do does not see it.
     interactor_->cancel();
-    interactor_->cancel();
-    expectCancelled();
     EXPECT_NO_THROW(revertAll());
-    expectReverted();
-}
-
-TEST_F(RevertCancellation, AskedForAmongTheNotificationsStopsAtTheNext)
-{
-    LogCapture log(git::SeverityProgress);
-    onNotification(log, 100, [this] { interactor_->cancel(); });
+    changeAll();
     expectCancelled();
-    EXPECT_THAT(notifications(log), SizeIs(100));
-    EXPECT_THAT(interactor_->progress.calls, IsEmpty());
-    expectUnstagedOnly();
-    expectUsable();
-
-    EXPECT_NO_THROW(revertAll());
-    expectReverted();
-    expectUsable();
 }
 
 TEST_F(RevertCancellation, PutsBackTheLinksThatWereInTheWay)
@@ -202,7 +182,7 @@ TEST_F(RevertCancellation, PutsBackTheLinksThatWereInTheWay)
     changed_ = stateOf(repository_);
     LogCapture log(git::SeverityProgress);
     onNotification(log, 200, [this] { interactor_->cancel(); });
-    const upath everything = vclink::test::asPath(repository_.path() / "*");
+    const upath everything = asPath(repository_.path() / "*");
     EXPECT_THROW(adapter_->revertFiles({everything}), CancelledOperationException);
     expectUnstagedOnly();
     expectUsable();
@@ -233,6 +213,7 @@ TEST_F(RevertCancellation, AskedForOnAnotherThreadStopsTheCheckout)
     expectCancelled();
     person.join();
     EXPECT_THAT(notifications(log), SizeIs(100));
+    EXPECT_THAT(interactor_->progress.calls, IsEmpty());
     expectUnstagedOnly();
     expectUsable();
 
@@ -241,56 +222,29 @@ TEST_F(RevertCancellation, AskedForOnAnotherThreadStopsTheCheckout)
 }
 
 // libgit2 notifies of all files before it writes the first.
-TEST_F(RevertCancellation, AskedForDuringTheFirstFileStopsTheNextCheckoutOnly)
+// libgit2 notifies of all files before it writes the first.
+TEST_F(RevertCancellation, AskedForDuringTheFirstFileOrAfterTheLastStopsTheNextCheckoutOnly)
 {
-    interactor_->progress.onCall = [this](std::size_t number)
+    for (const std::size_t call : {std::size_t{3}, std::size_t{2 * fileCount + 1}})
     {
-        if (number == 3)
-            interactor_->cancel();
-    };
-    EXPECT_NO_THROW(revertAll());
-    EXPECT_THAT(interactor_->progress.calls, SizeIs(2 * fileCount + 1));
-    expectReverted();
+        interactor_->progress.calls.clear();
+        interactor_->progress.onCall = [this, call](std::size_t number)
+        {
+            if (number == call)
+                interactor_->cancel();
+        };
+        EXPECT_NO_THROW(revertAll());
+        EXPECT_THAT(interactor_->progress.calls, SizeIs(2 * fileCount + 1));
+        expectReverted();
+        interactor_->progress.onCall = nullptr;
 
-    changeAll();
-    const LogCapture log(git::SeverityProgress);
-    expectCancelled();
-    EXPECT_THAT(notifications(log), IsEmpty());
-    expectUnstagedOnly();
-    expectUsable();
-
-    EXPECT_NO_THROW(revertAll());
-    expectReverted();
-}
-
-TEST_F(RevertCancellation, AskedForAfterTheLastFileStopsTheNextCheckoutOnly)
-{
-    interactor_->progress.onCall = [this](std::size_t number)
-    {
-        if (number == 2 * fileCount + 1)
-            interactor_->cancel();
-    };
-    EXPECT_NO_THROW(revertAll());
-    expectReverted();
-    expectUsable();
-
-    changeAll();
-    const LogCapture log(git::SeverityProgress);
-    expectCancelled();
-    EXPECT_THAT(notifications(log), IsEmpty());
-    expectUnstagedOnly();
-
-    EXPECT_NO_THROW(revertAll());
-    expectReverted();
-}
-
-TEST_F(RevertCancellation, IsNotSeenByACheckoutThatNotifiesOfNothing)
-{
-    revertAll();
-    interactor_->cancel();
-    EXPECT_NO_THROW(revertAll());
-    changeAll();
-    expectCancelled();
+        changeAll();
+        const LogCapture log(git::SeverityProgress);
+        expectCancelled();
+        EXPECT_THAT(notifications(log), IsEmpty());
+        expectUnstagedOnly();
+        expectUsable();
+    }
     EXPECT_NO_THROW(revertAll());
     expectReverted();
 }
@@ -299,8 +253,8 @@ TEST_F(RevertCancellation, DoesNotStopTheOtherOperations)
 {
     interactor_->cancel();
     const std::string root = repository_.path().string();
-    EXPECT_THAT(adapter_->getFolderStates(vclink::test::asPath(root)), SizeIs(fileCount));
-    EXPECT_NO_THROW(adapter_->markResolved(vclink::test::asPath(root + '/' + names_.back())));
+    EXPECT_THAT(adapter_->getFolderStates(asPath(root)), SizeIs(fileCount));
+    EXPECT_NO_THROW(adapter_->markResolved(asPath(root + '/' + names_.back())));
     expectCancelled();
 }
 
@@ -336,28 +290,13 @@ TEST_F(RevertCancellation, IsSeenByEachAdapterOfTheInteractor)
     const auto other = makeAdapter(repository_.path());
     interactor_->cancel();
     expectCancelled();
-    EXPECT_THROW(other->revertFiles({vclink::test::asPath(repository_.path() / names_.front())}),
+    EXPECT_THROW(other->revertFiles({asPath(repository_.path() / names_.front())}),
                  CancelledOperationException);
     EXPECT_NO_THROW(revertAll());
-}
-
-TEST_F(RevertCancellation, AskedForBeforeTheAdapterWasMadeIsNotItsAffair)
-{
     interactor_->cancel();
+    // Not the affair of an adapter that is made later.
     EXPECT_NO_THROW(makeAdapter(repository_.path())
-                        ->revertFiles({vclink::test::asPath(repository_.path() / names_.front())}));
-}
-
-TEST_F(RevertCancellation, IsInTheLog)
-{
-    interactor_->cancel();
-    const LogCapture log(git::SeverityException | git::SeverityDiagnostic);
-    expectCancelled();
-    const auto messages = log.messages();
-    ASSERT_THAT(messages, SizeIs(2));
-    EXPECT_THAT(messages[0], testing::StartsWith("Exception caught: "));
-    EXPECT_THAT(messages[0], testing::HasSubstr("CancelledOperationException"));
-    EXPECT_EQ(messages[1], "Re-throwing error from callback");
+                        ->revertFiles({asPath(repository_.path() / names_.front())}));
 }
 
 } // namespace

@@ -11,18 +11,10 @@ namespace
 {
 
 using testing::ElementsAre;
-using vclink::test::asPath;
-using vclink::test::Failure;
-using vclink::test::failureOf;
-using vclink::test::indexOf;
-using vclink::test::NothingChanges;
-using vclink::test::printed;
-using vclink::test::RepositoryState;
-using vclink::test::stampOf;
-using vclink::test::workingTreeOf;
+using namespace vclink::test;
 
 /// What a failure of a revert leaves behind: everything, or what the reset of the index made.
-class RevertFailure : public vclink::test::StagingFixture
+class RevertFailure : public StagingFixture
 {
   protected:
     RevertFailure()
@@ -45,43 +37,6 @@ class RevertFailure : public vclink::test::StagingFixture
     }
 };
 
-TEST_F(RevertFailure, OfALockedIndexChangesNothing)
-{
-    repository_.write(".git/index.lock", "another process");
-    const NothingChanges nothing(repository_);
-    EXPECT_EQ(failureOf(
-                  [this] {
-                      revert({"file", "other"});
-                  }),
-              (Failure{GIT_ELOCKED, GIT_ERROR_INDEX,
-                       "the index is locked by '" + path(".git/index.lock") +
-                           "'; this might be due to a concurrent or crashed process"}));
-}
-
-TEST_F(RevertFailure, OfAFolderOfGitThatCannotBeWrittenChangesNothing)
-{
-    giveAway();
-    repository_.setMode(".git", 0555);
-    {
-        const NothingChanges nothing(repository_);
-        EXPECT_EQ(unprivilegedFailureOf(
-                      [this] {
-                          revert({"file", "other"});
-                      }),
-                  printed({GIT_ERROR, GIT_ERROR_OS,
-                           "failed to create locked file '" + path(".git/index.lock") +
-                               "': Permission denied"}));
-    }
-    repository_.setMode(".git", 0755);
-}
-
-TEST_F(RevertFailure, OfARootThatCannotBeOpenedIsRaised)
-{
-    const auto missing = makeAdapter(folder() / "missing");
-    EXPECT_EQ(failureOf([&] { missing->revertFiles({asPath(folder() / "missing/file")}); }).code,
-              GIT_ENOTFOUND);
-}
-
 TEST_F(RevertFailure, OfABrokenIndexChangesNothing)
 {
     repository_.write(".git/index",
@@ -93,17 +48,6 @@ TEST_F(RevertFailure, OfABrokenIndexChangesNothing)
                        "invalid data in index - incorrect header signature"}));
     EXPECT_EQ(stampOf(path(".git/index")), index);
     EXPECT_EQ(workingTreeOf(repository_), tree);
-}
-
-TEST_F(RevertFailure, OfABareRepositoryIsRaised)
-{
-    const std::string bare = folder() / "bare";
-    repository_.git({"clone", "--quiet", "--bare", repository_.path().string(), bare});
-    const auto adapter = makeAdapter(bare);
-    EXPECT_EQ(
-        failureOf([&] { adapter->revertFiles({asPath(bare + "/file")}); }),
-        (Failure{GIT_EBAREREPO, GIT_ERROR_REPOSITORY,
-                 "cannot checkout. This operation is not allowed against bare repositories."}));
 }
 
 /// The file is out of the index, as where there is no commit, and on disk as it was. In a process

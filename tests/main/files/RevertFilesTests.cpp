@@ -1,5 +1,4 @@
 // SPDX-License-Identifier: MIT
-#include <ostream>
 #include <string>
 #include <vector>
 
@@ -7,102 +6,151 @@
 #include <gtest/gtest.h>
 
 #include "StagingFixture.hpp"
-#include "runScript.hpp"
+#include "support/Change.hpp"
+#include "support/Sentence.hpp"
 
 namespace
 {
 
 using shared_vclink::git::Conflicted;
 using testing::ElementsAre;
-using vclink::test::asPath;
-using vclink::test::expectRefusal;
-using vclink::test::GitRepository;
-using vclink::test::NothingChanges;
-using vclink::test::RepositoryState;
-using vclink::test::stampOf;
-using vclink::test::States;
-using vclink::test::workingTreeOf;
+using namespace vclink::test;
 
-class RevertFiles : public vclink::test::StagingFixture
+class RevertFiles : public StagingFixture
 {
 };
 
-/// What is done in a script of the shell, what is reverted, and git's status then.
-struct RevertCase
+/// What is changed, what is reverted and git's status then; what is done and committed before.
+struct RevertRow : Sentence
 {
-    const char *sentence;
-    const char *script;
+    Change change;
     std::vector<std::string> names;
-    std::vector<std::string> status{};
+    std::vector<std::string> status = {};
+    Change before = {};
 };
 
-void PrintTo(const RevertCase &row, std::ostream *stream)
-{
-    *stream << row.script;
-}
-
-class RevertAsGit : public RevertFiles, public testing::WithParamInterface<RevertCase>
+class RevertedAsByGit : public RevertFiles, public testing::WithParamInterface<RevertRow>
 {
 };
 
-TEST_P(RevertAsGit, Reverts)
+TEST_P(RevertedAsByGit, Is)
 {
-    vclink::test::runScript(repository_, GetParam().script);
+    if (GetParam().before)
+    {
+        GetParam().before(repository_);
+        repository_.commitAll("before");
+    }
+    GetParam().change(repository_);
     expectRevertsAsGit(GetParam().names);
     EXPECT_EQ(status(), GetParam().status);
 }
 
-const RevertCase revertCases[] = {
-    {"AnEdit", "echo edited >file", {"file"}},
-    {"AStagedEdit", "echo staged >file; git add file", {"file"}},
-    {"AStagedEditAndTheEditOnTopOfIt",
-     "echo staged >file; git add file; echo edited >file",
-     {"file"}},
-    {"AnEditOfTheSameLength", "echo CONTENT OF FILE >file", {"file"}},
-    {"AFileThatIsGoneFromDisk", "rm file", {"file"}},
-    {"AFileThatIsGoneWithTheFolderAboveIt", "rm -r sub", {"sub/inside"}},
-    {"AFileWhoseDeletionIsStaged", "git rm --quiet file", {"file"}},
-    {"AFileThatWasTakenOutOfTheIndex", "git rm --quiet --cached file; echo edited >file", {"file"}},
-    {"SeveralFilesAtOnce",
-     "echo edited >file; rm sub/inside; git rm --quiet other",
-     {"sub/inside", "other", "file"}},
-    {"NoOtherChanges",
-     "echo edited >file; echo staged >other; git add other; echo edited >other; rm sub/inside; "
-     "echo x >added; git add added; echo x >new",
-     {"file"},
-     {"A  added", "MM other", " D sub/inside", "?? new"}},
-    {"AFolderThatIsGone", "rm -r sub", {"sub"}},
-    {"WithAHeadThatNamesNoBranch", "git checkout --quiet --detach; echo edited >file", {"file"}},
-};
-
-INSTANTIATE_TEST_SUITE_P(It, RevertAsGit, testing::ValuesIn(revertCases),
-                         [](const auto &row) { return row.param.sentence; });
-
-TEST_F(RevertFiles, TakesAnAddedFileOutOfTheIndexAndLeavesItOnDisk)
+Change stages(const std::string &name, const std::string &bytes)
 {
-    repository_.write("new", "x");
-    repository_.add({"new"});
-    const auto before = stampOf(repository_ / "new");
-    revert({"new"});
-    EXPECT_EQ(stampOf(repository_ / "new"), before);
-    EXPECT_EQ(states(repository_, {"new"}), (States{{"new", "Unversioned"}}));
-    EXPECT_THAT(status(), ElementsAre("?? new"));
+    return writes(name, bytes) + runsGit({"add", name});
 }
 
-TEST_F(RevertFiles, LeavesUntrackedIgnoredAndUnchangedFilesAlone)
+const RevertRow contentRows[]{
+    {{"AnEdit"}, writes("file", "edited\n"), {"file"}},
+    {{"AnEditOfTheSameLength"}, writes("file", "CONTENT OF FILE\n"), {"file"}},
+    {{"AStagedEdit"}, stages("file", "staged\n"), {"file"}},
+    {{"AStagedEditAndTheEditOnTopOfIt"},
+     stages("file", "staged\n") + writes("file", "edited\n"),
+     {"file"}},
+    {{"AFileThatIsGoneFromDisk"}, removes("file"), {"file"}},
+    {{"AFileThatIsGoneWithTheFolderAboveIt"}, removes("sub"), {"sub/inside"}},
+    {{"AFolderThatIsGone"}, removes("sub"), {"sub"}},
+    {{"AFileWhoseDeletionIsStaged"}, runsGit({"rm", "--quiet", "file"}), {"file"}},
+    {{"AFileThatWasTakenOutOfTheIndex"},
+     runsGit({"rm", "--quiet", "--cached", "file"}) + writes("file", "edited since\n"),
+     {"file"}},
+    {{"AFileAmongOtherChanges"},
+     writes("file", "edited\n") + stages("other", "staged\n") + writes("other", "edited\n") +
+         removes("sub/inside") + stages("added", "x") + writes("new", "x"),
+     {"file"},
+     {"A  added", "MM other", " D sub/inside", "?? new"}},
+    {{"SeveralFilesAtOnce"},
+     writes("file", "edited\n") + removes("sub/inside") + runsGit({"rm", "--quiet", "other"}),
+     {"sub/inside", "other", "file"}},
+    {{"AllBelowAFolder"},
+     writes("sub/deep/#b", "edited\n") + writes("sub/inside", "edited\n") +
+         writes("subway", "edited\n") + writes("sub/new", "x"),
+     {"sub"},
+     {" M subway", "?? sub/new"},
+     writes("sub/deep/#b", "x") + writes("subway", "x")},
+    {{"AnEditOnADetachedHead"},
+     runsGit({"checkout", "--quiet", "--detach"}) + writes("file", "edited\n"),
+     {"file"}},
+    {{"AnEditOfTheSecondCommit"},
+     writes("file", "edited\n"),
+     {"file"},
+     {},
+     writes("file", "second\n")},
+};
+
+INSTANTIATE_TEST_SUITE_P(Content, RevertedAsByGit, testing::ValuesIn(contentRows),
+                         testing::PrintToStringParamName());
+
+const RevertRow kindRows[]{
+    {{"AnExecutableBit"},
+     [](const GitRepository &copy)
+     {
+         copy.setMode("tool", 0644);
+         copy.setMode("file", 0755);
+     },
+     {"tool", "file"},
+     {},
+     writes("tool", "x") + makesExecutable("tool")},
+    {{"AStagedExecutableBit"}, makesExecutable("file") + runsGit({"add", "file"}), {"file"}},
+    {{"LineEndsAsTheAttributesSay"},
+     writes("a.txt", "edited\n") + removes("a.bin"),
+     {"a.txt", "a.bin"},
+     {},
+     writes(".gitattributes", "*.txt text eol=crlf\n*.bin -text\n") +
+         writes("a.txt", "one\r\ntwo\r\n") + writes("a.bin", "one\r\ntwo\n")},
+    {{"LinksThatAreGoneOrLeadNowhere"},
+     removes("gone") + links("elsewhere", "dangling"),
+     {"gone", "dangling"},
+     {},
+     links("file", "gone") + links("nowhere", "dangling")},
+    {{"AFileOfALinkThatLeadsNowhere"}, links("nowhere", "file"), {"file"}},
+    {{"AFileOfAFolder"}, removes("file") + writes("file/inside", "x"), {"file"}},
+    {{"AStagedChangeOfAFileToALink"},
+     links("nowhere", "file") + runsGit({"add", "file"}) + stages("other", "edited\n"),
+     {"file", "other"}},
+    {{"AStagedChangeOfALinkToAFile"},
+     removes("link") + stages("link", "x"),
+     {"link"},
+     {},
+     links("nowhere", "link")},
+    {{"TheDeletionOfARenaming"}, moves("file", "renamed"), {"file"}, {"A  renamed"}},
+    {{"AFileBesideEntriesWithFlags"},
+     runsGit({"update-index", "--skip-worktree", "other"}) +
+         runsGit({"update-index", "--assume-unchanged", "sub/inside"}) + removes("other") +
+         writes("file", "edited\n"),
+     {"file"}},
+};
+
+INSTANTIATE_TEST_SUITE_P(Kind, RevertedAsByGit, testing::ValuesIn(kindRows),
+                         testing::PrintToStringParamName());
+
+/// And does not write a file without changes.
+TEST_F(RevertFiles, LeavesAddedUntrackedAndIgnoredFilesAlone)
 {
     repository_.write(".git/info/exclude", "*.o\n");
-    for (const auto *name : {"new", "a.o", "file"})
-        repository_.write(name, "edited\n");
-    const auto stamps = [this]
-    {
-        return std::vector{stampOf(repository_ / "new"), stampOf(repository_ / "a.o"),
-                           stampOf(repository_ / "other")};
-    };
-    const auto before = stamps();
-    revert({"new", "a.o", "other", "file"});
-    EXPECT_EQ(stamps(), before);
-    EXPECT_THAT(status(), ElementsAre("?? new"));
+    const std::vector<std::string> names{"added", "a.o", "new", "other"};
+    for (const auto *name : {"added", "a.o", "new"})
+        repository_.write(name, "x");
+    repository_.add({"added"});
+    repository_.write("file", "edited\n");
+    std::vector<FileStamp> before;
+    for (const auto &name : names)
+        before.push_back(stampOf(repository_ / name));
+    revert({"added", "a.o", "file", "new", "other"});
+    for (std::size_t i = 0; i < names.size(); ++i)
+        EXPECT_EQ(stampOf(repository_ / names[i]), before[i]) << names[i];
+    EXPECT_EQ(states(repository_, {"added"}), (States{{"added", "Unversioned"}}));
+    EXPECT_THAT(status(), ElementsAre("?? added", "?? new"));
 }
 
 TEST_F(RevertFiles, DoesNothingForAnEmptyList)
@@ -111,63 +159,6 @@ TEST_F(RevertFiles, DoesNothingForAnEmptyList)
     const NothingChanges nothing(repository_);
     revert({});
     EXPECT_NO_THROW(makeAdapter(folder() / "missing")->revertFiles({}));
-}
-
-TEST_F(RevertFiles, TakesAnEmptyPathAndTheRootForNothing)
-{
-    repository_.write("file", "edited\n");
-    repository_.write("other", "staged\n");
-    repository_.add({"other"});
-    const RepositoryState before = stateOf(repository_);
-    const auto adapter = makeAdapter(repository_.path());
-    adapter->revertFiles({upath()});
-    adapter->revertFiles({asPath(repository_.path())});
-    adapter->revertFiles({asPath(repository_ / "."), asPath("missing/relative"), asPath("/")});
-    EXPECT_EQ(stateOf(repository_), before);
-    adapter->revertFiles({upath(), asPath(repository_ / "file"), asPath(repository_.path())});
-    EXPECT_THAT(status(), ElementsAre("M  other"));
-}
-
-TEST_F(RevertFiles, DoesNothingForANameThatDoesNotExist)
-{
-    repository_.write("file", "edited\n");
-    const RepositoryState before = stateOf(repository_);
-    revert({"missing", "file/below", "../outside"});
-    EXPECT_EQ(stateOf(repository_), before);
-}
-
-TEST_F(RevertFiles, TakesAFolderForAllBelowIt)
-{
-    repository_.write("sub/deep/#b", "x");
-    repository_.write("subway", "x");
-    repository_.commitAll("second");
-    for (const auto *name : {"sub/deep/#b", "sub/inside", "subway"})
-        repository_.write(name, "edited\n");
-    repository_.write("sub/new", "x");
-    expectRevertsAsGit({"sub"});
-    EXPECT_THAT(status(), ElementsAre(" M subway", "?? sub/new"));
-}
-
-TEST_F(RevertFiles, TakesAFolderWithADangerousNameForItsOwnEntry)
-{
-    repository_.write("#dir/a", "x");
-    repository_.write("dir /a", "x");
-    repository_.commitAll("second");
-    repository_.write("#dir/a", "edited");
-    repository_.write("dir /a", "edited");
-    repository_.write("file", "edited");
-    const RepositoryState before = stateOf(repository_);
-    revert({"#dir", "dir "});
-    EXPECT_EQ(stateOf(repository_), before);
-}
-
-TEST_F(RevertFiles, GoesBackToTheCommitThatHeadNames)
-{
-    repository_.write("file", "second\n");
-    repository_.commitAll("second");
-    repository_.write("file", "edited\n");
-    revert({"file"});
-    EXPECT_EQ(repository_.read("file"), "second\n");
 }
 
 TEST_F(RevertFiles, WorksInALinkedWorktree)
@@ -221,13 +212,15 @@ TEST_F(RevertFiles, RefusesAFileInConflictAndRevertsNoOther)
     EXPECT_EQ(states(repository_, {"file"}), (States{{"file", "Modified"}}));
 }
 
-TEST_F(RevertFiles, ReportsTheFilesInConflictInTheOrderOfPathsAlsoOfAFolder)
+TEST_F(RevertFiles, ReportsTheFilesInConflictAlsoThoseOfAFolderInTheOrderOfPaths)
 {
     beginMerge({"a-b", "a.b", "a/x", "B"});
     const NothingChanges nothing(repository_);
-    const std::vector<std::string> names{"file", "a.b", "a-b", "a/x", "B", "./a.b"};
-    expectRefusal<Conflicted>(inRoot({"B", "a/x", "a-b", "a.b"}), [&] { revert(names); });
     expectRefusal<Conflicted>(inRoot({"a/x"}), [this] { revert({"a"}); });
+    expectRefusal<Conflicted>(inRoot({"B", "a/x", "a-b", "a.b"}),
+                              [this] {
+                                  revert({"file", "a.b", "a-b", "a/x", "B", "./a.b"});
+                              });
 }
 
 TEST_F(RevertFiles, RefusesWithTheCataloguesText)
@@ -241,7 +234,7 @@ TEST_F(RevertFiles, RefusesWithTheCataloguesText)
     catch (const vclink::git::TagException<Conflicted> &exception)
     {
         EXPECT_EQ(exception.GetBaseMsgIDObj().getKey(), "Conflicted");
-        EXPECT_EQ(vclink::test::asUtf8(exception.GetUnicodeMessageTxt()),
+        EXPECT_EQ(asUtf8(exception.GetUnicodeMessageTxt()),
                   "Nothing was reverted, because these files have unresolved conflicts:\n" +
                       (repository_ / "conflicted").string());
     }

@@ -3,7 +3,6 @@
 #include <string>
 #include <vector>
 
-#include <boost/filesystem/exception.hpp>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
@@ -14,48 +13,13 @@ namespace
 
 namespace fs = std::filesystem;
 using testing::ElementsAre;
-using vclink::test::asPath;
-using vclink::test::GitRepository;
-using vclink::test::indexOf;
-using vclink::test::NothingChanges;
-using vclink::test::RepositoryState;
+using namespace vclink::test;
 
 /// Reverts where more than a file's content was changed: its mode, its line ends, or what stands
 /// there at all.
-class RevertedKinds : public vclink::test::StagingFixture
+class RevertedKinds : public StagingFixture
 {
 };
-
-TEST_F(RevertedKinds, TakesTheExecutableBitBack)
-{
-    repository_.write("tool", "x");
-    repository_.setMode("tool", 0755);
-    repository_.commitAll("second");
-    repository_.setMode("tool", 0644);
-    repository_.setMode("file", 0755);
-    expectRevertsAsGit({"tool", "file"});
-    EXPECT_THAT(status(), ElementsAre());
-}
-
-TEST_F(RevertedKinds, TakesAStagedExecutableBitBack)
-{
-    repository_.setMode("file", 0755);
-    repository_.add({"file"});
-    expectRevertsAsGit({"file"});
-}
-
-TEST_F(RevertedKinds, WritesLineEndsAsTheAttributesSay)
-{
-    repository_.write(".gitattributes", "*.txt text eol=crlf\n*.bin -text\n");
-    repository_.write("a.txt", "one\r\ntwo\r\n");
-    repository_.write("a.bin", "one\r\ntwo\n");
-    repository_.commitAll("second");
-    repository_.write("a.txt", "edited\n");
-    repository_.remove("a.bin");
-    expectRevertsAsGit({"a.txt", "a.bin"});
-    EXPECT_EQ(repository_.read("a.txt"), "one\r\ntwo\r\n");
-    EXPECT_EQ(repository_.read("a.bin"), "one\r\ntwo\n");
-}
 
 TEST_F(RevertedKinds, TakesALinkForItsTarget)
 {
@@ -69,42 +33,6 @@ TEST_F(RevertedKinds, TakesALinkForItsTarget)
     repository_.symlink("other", "link");
     revert({"link"});
     EXPECT_THAT(status(), ElementsAre(" M link"));
-}
-
-TEST_F(RevertedKinds, BringsBackALinkThatIsGoneOrLeadsNowhere)
-{
-    repository_.symlink("file", "gone");
-    repository_.symlink("nowhere", "dangling");
-    repository_.commitAll("second");
-    repository_.remove("gone");
-    repository_.remove("dangling");
-    repository_.symlink("elsewhere", "dangling");
-    expectRevertsAsGit({"gone", "dangling"});
-    EXPECT_EQ(fs::read_symlink(repository_ / "gone"), "file");
-    EXPECT_EQ(fs::read_symlink(repository_ / "dangling"), "nowhere");
-}
-
-TEST_F(RevertedKinds, MakesAFileAgainOfALinkThatLeadsNowhere)
-{
-    repository_.remove("file");
-    repository_.symlink("nowhere", "file");
-    expectRevertsAsGit({"file"});
-    EXPECT_EQ(repository_.read("file"), "content of file\n");
-}
-
-TEST_F(RevertedKinds, RaisesOnALoopOfLinks)
-{
-    repository_.symlink("loop", "loop");
-    repository_.write("file", "edited");
-    const NothingChanges nothing(repository_);
-    EXPECT_THROW(revert({"file", "loop"}), boost::filesystem::filesystem_error);
-}
-
-TEST_F(RevertedKinds, MakesAFileAgainOfAFolder)
-{
-    repository_.remove("file");
-    repository_.write("file/inside", "x");
-    expectRevertsAsGit({"file"});
 }
 
 /// libgit2 stumbles over a folder whose entries are the first of the index.
@@ -160,27 +88,6 @@ TEST_F(RevertedKinds, MakesFilesAgainOfStagedFoldersWhoseNamesNeedAnEscape)
         expectRevertsAsGit({name});
         EXPECT_THAT(status(), ElementsAre()) << name;
     }
-}
-
-TEST_F(RevertedKinds, TakesAStagedChangeOfAFileToALinkBack)
-{
-    repository_.remove("file");
-    repository_.symlink("nowhere", "file");
-    repository_.write("other", "edited\n");
-    repository_.add({"file", "other"});
-    expectRevertsAsGit({"file", "other"});
-    EXPECT_THAT(status(), ElementsAre());
-}
-
-TEST_F(RevertedKinds, TakesAStagedChangeOfALinkToAFileBack)
-{
-    repository_.symlink("nowhere", "link");
-    repository_.commitAll("second");
-    repository_.remove("link");
-    repository_.write("link", "x");
-    repository_.add({"link"});
-    expectRevertsAsGit({"link"});
-    EXPECT_THAT(status(), ElementsAre());
 }
 
 TEST_F(RevertedKinds, WritesNothingThroughALinkThatStandsForAFile)
@@ -251,25 +158,16 @@ TEST_F(RevertedKinds, PutsASubmodulesCommitBackIntoTheIndex)
     EXPECT_EQ(module.read("file"), "edited");
 }
 
-TEST_F(RevertedKinds, BringsBackTheFolderOfASubmodule)
-{
-    auto inner = makeRepository("inner");
-    inner.write("file", "x");
-    inner.commitAll("first");
-    repository_.git({"submodule", "--quiet", "add", inner.path().string(), "module"});
-    repository_.commit("second");
-    repository_.remove("module");
-    expectRevertsAsGit({"module"});
-    EXPECT_TRUE(fs::is_empty(repository_ / "module"));
-}
-
-TEST_F(RevertedKinds, MakesAFolderAgainOfALinkThatStandsForASubmodule)
+TEST_F(RevertedKinds, MakesAFolderAgainOfASubmoduleThatIsGoneOrOfALinkInItsPlace)
 {
     auto inner = makeRepository("inner");
     inner.write("file", "x");
     inner.commitAll("first");
     repository_.git({"submodule", "--quiet", "add", inner.path().string(), "sub/module"});
     repository_.commit("second");
+    repository_.remove("sub/module");
+    expectRevertsAsGit({"sub/module"});
+    EXPECT_TRUE(fs::is_empty(repository_ / "sub/module"));
     repository_.write("../outside/file", "precious");
     repository_.remove("sub/module");
     repository_.symlink("../../outside", "sub/module");
@@ -278,21 +176,14 @@ TEST_F(RevertedKinds, MakesAFolderAgainOfALinkThatStandsForASubmodule)
     EXPECT_EQ(repository_.read("../outside/file"), "precious");
 }
 
-TEST_F(RevertedKinds, TakesAnIntentToAddOutOfTheIndex)
+TEST_F(RevertedKinds, TakesAnIntentToAddAndBothSidesOfARenamingBack)
 {
     repository_.write("new", "x");
     repository_.git({"add", "--intent-to-add", "new"});
-    revert({"new"});
-    EXPECT_THAT(status(), ElementsAre("?? new"));
-}
-
-TEST_F(RevertedKinds, LeavesTheFlagsOfOtherEntries)
-{
-    repository_.git({"update-index", "--skip-worktree", "other"});
-    repository_.git({"update-index", "--assume-unchanged", "sub/inside"});
-    repository_.remove("other");
-    repository_.write("file", "edited\n");
-    expectRevertsAsGit({"file"});
+    repository_.git({"mv", "file", "renamed"});
+    revert({"new", "file", "renamed"});
+    EXPECT_THAT(status(), ElementsAre("?? new", "?? renamed"));
+    EXPECT_EQ(repository_.read("file"), "content of file\n");
 }
 
 TEST_F(RevertedKinds, WorksBelowARootThatIsReachedThroughALink)
@@ -305,21 +196,6 @@ TEST_F(RevertedKinds, WorksBelowARootThatIsReachedThroughALink)
     const std::string root = folder() / "link/";
     makeAdapter(root)->revertFiles({asPath(root + "file"), asPath(root + "sub")});
     EXPECT_THAT(status(), ElementsAre(" M other"));
-}
-
-TEST_F(RevertedKinds, TakesTheDeletionOfARenamingBack)
-{
-    repository_.git({"mv", "file", "renamed"});
-    expectRevertsAsGit({"file"});
-    EXPECT_THAT(status(), ElementsAre("A  renamed"));
-}
-
-TEST_F(RevertedKinds, TakesBothSidesOfARenamingBack)
-{
-    repository_.git({"mv", "file", "renamed"});
-    revert({"file", "renamed"});
-    EXPECT_THAT(status(), ElementsAre("?? renamed"));
-    EXPECT_EQ(repository_.read("file"), "content of file\n");
 }
 
 } // namespace

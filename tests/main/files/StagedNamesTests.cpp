@@ -1,4 +1,6 @@
 // SPDX-License-Identifier: MIT
+#include <cstddef>
+#include <functional>
 #include <string>
 #include <vector>
 
@@ -12,69 +14,66 @@ namespace
 
 using shared_vclink::git::AlreadyAdded;
 using shared_vclink::git::Conflicted;
+using shared_vclink::git::NoFilesToRemove;
 using testing::ElementsAre;
-using vclink::test::expectRefusal;
-using vclink::test::indexOf;
-using vclink::test::NothingChanges;
-using vclink::test::RepositoryState;
+using testing::UnorderedElementsAre;
+using namespace vclink::test;
 
 /// Each is the name of one file; every one is a decoy for the others.
-const std::vector<std::string> hardNames{
-    "a",
-    "b",
-    "#a",
-    "!b",
-    "#notes#",
-    "!",
-    "#",
-    "##a",
-    "!!b",
-    " a",
-    "a b",
-    "a ",
-    "a  ",
-    " ",
-    "a\t",
-    "a\r",
-    "a\n",
-    "a\v",
-    "a\f",
-    "a\nb",
-    "# ",
-    "! a ",
-    "-a",
-    "--all",
-    ":a",
-    ":!a",
-    ":(top)a",
-    "^a",
-    "~a",
-    "{a,b}",
-    "a]",
-    ".a",
-    "...",
-    "..a",
-    "a'b",
-    "\"a\"",
-    "$HOME",
-    "\x01",
-    "\x7F",
-    "\xC3\xBC",
-    "u\xCC\x88",
-    "\xE6\x97\xA5\xE6\x9C\xAC",
-    "\xF0\x9F\x98\x80",
-    "\xFF",
-    "a\xFF ",
-    "\xED\xA0\x80",
-    "\xC2\xA0",
-    "d/#a",
-    "d/a ",
-    "d /a",
-    "#d/a",
-    "d/\xFF",
-};
+const std::vector<std::string> hardNames{"a",
+                                         "b",
+                                         "#a",
+                                         "!b",
+                                         "#notes#",
+                                         "!",
+                                         "#",
+                                         "##a",
+                                         "!!b",
+                                         " a",
+                                         "a b",
+                                         "a ",
+                                         "a  ",
+                                         " ",
+                                         "a\t",
+                                         "a\r",
+                                         "a\n",
+                                         "a\v",
+                                         "a\f",
+                                         "a\nb",
+                                         "# ",
+                                         "! a ",
+                                         "-a",
+                                         "--all",
+                                         ":a",
+                                         ":!a",
+                                         ":(top)a",
+                                         "^a",
+                                         "~a",
+                                         "{a,b}",
+                                         "a]",
+                                         ".a",
+                                         "...",
+                                         "..a",
+                                         "a'b",
+                                         "\"a\"",
+                                         "$HOME",
+                                         "\x01",
+                                         "\x7F",
+                                         "\xC3\xBC",
+                                         "u\xCC\x88",
+                                         "\xE6\x97\xA5\xE6\x9C\xAC",
+                                         "\xF0\x9F\x98\x80",
+                                         "\xFF",
+                                         "a\xFF ",
+                                         "\xED\xA0\x80",
+                                         "\xC2\xA0",
+                                         "d/#a",
+                                         "d/a ",
+                                         "d /a",
+                                         "#d/a",
+                                         "d/\xFF"};
 
-class StagedNames : public vclink::test::StagingFixture
+class StagedNames : public StagingFixture
 {
   protected:
     void writeAll(const std::vector<std::string> &names, const std::string &content) const
@@ -97,58 +96,48 @@ class StagedNames : public vclink::test::StagingFixture
         repository_.write(".git/index", before);
         return entries;
     }
+    /// Expects of each name, or of each with those that follow it, what git makes of the index.
+    void expectEachAsGit(const std::vector<std::string> &command,
+                         const std::function<void(const std::vector<std::string> &)> &action,
+                         std::ptrdiff_t count = 1) const
+    {
+        const std::string before = repository_.read(".git/index");
+        for (auto name = hardNames.begin(); hardNames.end() - name >= count; ++name)
+        {
+            const std::vector<std::string> names(name, name + count);
+            const auto expected = indexAfterGit(command, names);
+            EXPECT_NE(expected, indexOf(repository_));
+            action(names);
+            EXPECT_EQ(indexOf(repository_), expected) << testing::PrintToString(names);
+            repository_.write(".git/index", before);
+        }
+    }
 };
 
-TEST_F(StagedNames, AreAddedAlone)
+TEST_F(StagedNames, AreAddedAloneAndTogether)
 {
     writeAll(hardNames, "x");
-    const std::string before = repository_.read(".git/index");
-    for (const auto &name : hardNames)
-    {
-        const auto expected = indexAfterGit({"add"}, {name});
-        ASSERT_EQ(expected.size(), 4U);
-        add({name});
-        EXPECT_EQ(indexOf(repository_), expected) << testing::PrintToString(name);
-        repository_.write(".git/index", before);
-    }
-}
-
-TEST_F(StagedNames, AreAddedTogether)
-{
-    writeAll(hardNames, "x");
+    expectEachAsGit({"add"}, [this](const auto &names) { add(names); });
     const auto expected = indexAfterGit({"add"}, hardNames);
     add(hardNames);
     EXPECT_EQ(indexOf(repository_), expected);
     EXPECT_EQ(expected.size(), hardNames.size() + 3);
 }
 
-TEST_F(StagedNames, AreRemovedAlone)
+TEST_F(StagedNames, AreRemovedAloneAndInPairs)
 {
     writeAll(hardNames, "x");
     repository_.commitAll("second");
-    const std::string before = repository_.read(".git/index");
-    for (const auto &name : hardNames)
-    {
-        const auto expected = indexAfterGit({"rm", "--quiet", "--cached"}, {name});
-        remove({name});
-        EXPECT_EQ(indexOf(repository_), expected) << testing::PrintToString(name);
-        repository_.write(".git/index", before);
-    }
+    const auto removing = [this](const auto &names) { remove(names); };
+    expectEachAsGit({"rm", "--quiet", "--cached"}, removing);
+    expectEachAsGit({"rm", "--quiet", "--cached"}, removing, 2);
 }
 
-TEST_F(StagedNames, AreRemovedInPairs)
+TEST_F(StagedNames, AreMarkedAsResolvedAlone)
 {
-    writeAll(hardNames, "x");
-    repository_.commitAll("second");
-    const std::string before = repository_.read(".git/index");
-    for (std::size_t i = 0; i + 1 < hardNames.size(); ++i)
-    {
-        const std::vector<std::string> pair{hardNames[i], hardNames[i + 1]};
-        const auto expected = indexAfterGit({"rm", "--quiet", "--cached"}, pair);
-        remove(pair);
-        EXPECT_EQ(indexOf(repository_), expected) << testing::PrintToString(pair);
-        repository_.write(".git/index", before);
-    }
+    beginMerge(hardNames);
+    writeAll(hardNames, "merged");
+    expectEachAsGit({"add"}, [this](const auto &names) { markResolved(names.front()); });
 }
 
 TEST_F(StagedNames, AreRevertedAlone)
@@ -176,20 +165,6 @@ TEST_F(StagedNames, AreRevertedAlone)
     }
 }
 
-TEST_F(StagedNames, AreMarkedAsResolvedAlone)
-{
-    beginMerge(hardNames);
-    writeAll(hardNames, "merged");
-    const std::string before = repository_.read(".git/index");
-    for (const auto &name : hardNames)
-    {
-        const auto expected = indexAfterGit({"add"}, {name});
-        markResolved(name);
-        EXPECT_EQ(indexOf(repository_), expected) << testing::PrintToString(name);
-        repository_.write(".git/index", before);
-    }
-}
-
 TEST_F(StagedNames, StandInTheReportsAsTheyAre)
 {
     beginMerge(hardNames);
@@ -212,6 +187,50 @@ TEST_F(StagedNames, ThatBeginDangerouslyMeanTheFilesOfAList)
     EXPECT_THAT(status(), ElementsAre(" M a", " M b"));
     remove({"#a", "!b"});
     EXPECT_THAT(status(), ElementsAre("D  !b", "D  #a", " M a", " M b", "?? !b", "?? #a"));
+}
+
+/// The empty path, the root, what is elsewhere or nowhere, and folders with a dangerous name, of
+/// which only the entry itself is meant: that is the limit of what a list can say.
+TEST_F(StagedNames, OfNothingAreTakenForNothingAlsoBesideAFile)
+{
+    writeAll({"#dir/a", "!dir/a", "dir /a"}, "x");
+    repository_.commitAll("second");
+    writeAll({"#dir/a", "!dir/a", "dir /a", "file", "other", "#new/a", "!new/a", "new /a", "new",
+              "../outside"},
+             "edited");
+    repository_.add({"other"});
+    const std::string root = repository_.path();
+    std::vector<upath> paths{upath()};
+    for (const std::string &path : {root, root + "/.", std::string("missing/relative"),
+                                    std::string("/"), std::string("/new"), std::string("/*")})
+        paths.push_back(asPath(path));
+    const auto adapter = makeAdapter(root);
+    const RepositoryState before = stateOf(repository_);
+    for (const auto &path : paths)
+        adapter->markResolved(path);
+    for (const auto &path : files({"missing", "missing/below", "file/below", "../outside", "#dir",
+                                   "!dir", "dir ", "#new", "!new", "new "}))
+        paths.push_back(path);
+    for (const auto &path : paths)
+    {
+        SCOPED_TRACE(asBytes(path));
+        adapter->addFiles({path});
+        EXPECT_THROW(adapter->removeFiles({path}), vclink::git::TagException<NoFilesToRemove>);
+        adapter->revertFiles({path});
+    }
+    EXPECT_EQ(stateOf(repository_), before);
+    const auto besides = [&](const std::string &name)
+    {
+        std::vector<upath> more = paths;
+        more.push_back(asPath(root + '/' + name));
+        return more;
+    };
+    adapter->addFiles(besides("new"));
+    adapter->removeFiles(besides("sub/inside"));
+    adapter->revertFiles(besides("file"));
+    EXPECT_THAT(status(), UnorderedElementsAre(" M !dir/a", " M #dir/a", "A  new", " M dir /a",
+                                               "M  other", "D  sub/inside", "?? !new/a",
+                                               "?? #new/a", "?? new /a", "?? sub/inside"));
 }
 
 /// Names with wildcard characters, which act as patterns.

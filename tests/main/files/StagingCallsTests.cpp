@@ -19,9 +19,7 @@ using shared_vclink::git::NoFilesToRemove;
 using testing::ElementsAre;
 using testing::IsEmpty;
 using vclink::git::TagException;
-using vclink::test::LibGit2Recorder;
-using vclink::test::ofTheQuery;
-using vclink::test::operator+;
+using namespace vclink::test;
 using Names = std::vector<std::string>;
 
 const Names ofTheOpening{"git_repository_open_ext"};
@@ -43,7 +41,7 @@ struct AskedOfIndex
 };
 
 /// The calls of libgit2 that staging makes.
-class StagingCalls : public vclink::test::StagingFixture
+class StagingCalls : public StagingFixture
 {
   protected:
     StagingCalls()
@@ -109,43 +107,21 @@ TEST_F(StagingCalls, OfAFileMarkedAsResolvedAreThoseOfItsAdditionOrRemoval)
     EXPECT_THAT(calls_.openHandles(), IsEmpty());
 }
 
-TEST_F(StagingCalls, OpenTheRootItselfWithoutASearch)
-{
-    Names paths;
-    calls_.on<git_repository_open_ext>(
-        [&](git_repository **, const char *path, unsigned flags, const char *ceilings)
-        {
-            paths.emplace_back(path);
-            EXPECT_EQ(flags, static_cast<unsigned>(GIT_REPOSITORY_OPEN_NO_SEARCH));
-            EXPECT_EQ(ceilings, nullptr);
-        });
-    add({"new"});
-    markResolved("missing");
-    const std::string root = repository_.path();
-    EXPECT_THAT(paths, ElementsAre(root, root, root));
-}
-
-TEST_F(StagingCalls, OfAnAdditionHaveTheFilesAndNoFlag)
+TEST_F(StagingCalls, OfAnAdditionOrARemovalHaveTheFilesAndNoFlag)
 {
     repository_.write("#a", "x");
     repository_.write("sub/new", "x");
     add({"sub/new", "new", "#a", "missing"});
+    remove({"sub/inside", "file", "new"});
+    ASSERT_EQ(removals_.size(), 1U);
+    EXPECT_THAT(removals_[0].pathspec, ElementsAre("file", "new", "sub/inside"));
+    EXPECT_EQ(removals_[0].payload, adapter_.get());
     ASSERT_EQ(additions_.size(), 1U);
     EXPECT_THAT(additions_[0].pathspec,
                 ElementsAre(vclink::git::escapePathspec("#a"), "new", "sub/new"));
     EXPECT_EQ(additions_[0].flags, 0U);
     EXPECT_EQ(additions_[0].flags, static_cast<unsigned>(GIT_INDEX_ADD_DEFAULT));
     EXPECT_EQ(additions_[0].payload, adapter_.get());
-    EXPECT_THAT(removals_, IsEmpty());
-}
-
-TEST_F(StagingCalls, OfARemovalHaveTheFiles)
-{
-    remove({"sub/inside", "file", "new"});
-    ASSERT_EQ(removals_.size(), 1U);
-    EXPECT_THAT(removals_[0].pathspec, ElementsAre("file", "new", "sub/inside"));
-    EXPECT_EQ(removals_[0].payload, adapter_.get());
-    EXPECT_THAT(additions_, IsEmpty());
 }
 
 TEST_F(StagingCalls, OfAFileMarkedAsResolvedHaveThisFile)

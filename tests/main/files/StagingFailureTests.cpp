@@ -3,8 +3,10 @@
 #include <filesystem>
 #include <functional>
 #include <string>
+#include <utility>
 #include <vector>
 
+#include <boost/filesystem/exception.hpp>
 #include <git2.h>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
@@ -12,7 +14,6 @@
 
 #include "StagingFixture.hpp"
 #include "error/errorUtil/callbackException.hpp"
-#include "support/Descriptors.hpp"
 
 namespace
 {
@@ -20,16 +21,11 @@ namespace
 namespace fs = std::filesystem;
 using shared_vclink::git::NoFilesToRemove;
 using vclink::git::TagException;
-using vclink::test::asPath;
-using vclink::test::Failure;
-using vclink::test::failureOf;
-using vclink::test::NothingChanges;
-using vclink::test::printed;
-using vclink::test::States;
+using namespace vclink::test;
 
 /// What a failure of libgit2 leaves behind: nothing, here with a repository that holds changes of
 /// all kinds.
-class StagingFailure : public vclink::test::StagingFixture
+class StagingFailure : public StagingFixture
 {
   protected:
     StagingFailure()
@@ -47,7 +43,10 @@ class StagingFailure : public vclink::test::StagingFixture
         return {{"addFiles", [this] { add({"new"}); }},
                 {"removeFiles", [this] { remove({"file"}); }},
                 {"markResolved", [this] { markResolved("conflicted"); }},
-                {"markResolved of an absent file", [this] { markResolved("missing"); }}};
+                {"markResolved of an absent file", [this] { markResolved("missing"); }},
+                {"revertFiles", [this] {
+                     revert({"file", "other"});
+                 }}};
     }
 
     std::string inGit(const std::string &name) const
@@ -56,7 +55,7 @@ class StagingFailure : public vclink::test::StagingFixture
     }
 };
 
-TEST_F(StagingFailure, OfALockedIndexChangesNothing)
+TEST_F(StagingFailure, OfALockedIndexChangesNothingAndIsNoneWhereNothingIsWritten)
 {
     repository_.write(".git/index.lock", "another process");
     const NothingChanges nothing(repository_);
@@ -70,85 +69,49 @@ TEST_F(StagingFailure, OfALockedIndexChangesNothing)
         EXPECT_EQ(vclink::git::pendingCallbackException(), nullptr);
     }
     EXPECT_EQ(repository_.read(".git/index.lock"), "another process");
-}
-
-TEST_F(StagingFailure, OfALockedIndexIsOverWhenTheLockIsGone)
-{
-    repository_.write(".git/index.lock", "");
-    EXPECT_EQ(failureOf([this] { add({"new"}); }).code, GIT_ELOCKED);
-    repository_.remove(".git/index.lock");
-    add({"new"});
-    EXPECT_EQ(states(repository_, {"new"}), (States{{"new", "Added"}}));
-}
-
-TEST_F(StagingFailure, DoesNotComeOfALockedIndexWhereNothingIsWritten)
-{
-    repository_.write(".git/index.lock", "");
-    const NothingChanges nothing(repository_);
     EXPECT_NO_THROW(add({}));
     EXPECT_NO_THROW(add({"missing"}));
     EXPECT_THROW(remove({"missing"}), TagException<NoFilesToRemove>);
 }
 
-TEST_F(StagingFailure, OfAnUntrackedRepositoryWithinChangesNothing)
+TEST_F(StagingFailure, OfAPathThatTheIndexDoesNotTakeChangesNothing)
 {
-    auto nested = vclink::test::GitRepository::init(repository_ / "nested");
+    auto nested = GitRepository::init(repository_ / "nested");
     nested.write("inside", "x");
     nested.commitAll("first");
-    const auto unborn = vclink::test::GitRepository::init(repository_ / "unborn");
-    unborn.write("inside", "x");
+    GitRepository::init(repository_ / "unborn").write("inside", "x");
+    repository_.write("git~1", "x");
     const NothingChanges nothing(repository_);
-    for (const auto &names :
-         {std::vector<std::string>{"nested"}, std::vector<std::string>{"new", "nested"}})
-    {
-        EXPECT_EQ(failureOf([&] { add(names); }),
-                  (Failure{GIT_ERROR, GIT_ERROR_INDEX, "invalid path: 'nested/'"}));
-    }
-    EXPECT_EQ(failureOf(
-                  [this] {
-                      add({"unborn", "new"});
-                  }),
-              (Failure{GIT_ERROR, GIT_ERROR_INDEX, "invalid path: 'unborn/'"}));
+    const std::vector<std::pair<std::vector<std::string>, std::string>> lists{
+        {{"nested"}, "nested/"},
+        {{"new", "nested"}, "nested/"},
+        {{"unborn", "new"}, "unborn/"},
+        {{"new", "git~1"}, "git~1"}};
+    for (const auto &[names, path] : lists)
+        EXPECT_EQ(failureOf([&, &list = names] { add(list); }),
+                  (Failure{GIT_ERROR, GIT_ERROR_INDEX, "invalid path: '" + path + "'"}));
     EXPECT_EQ(failureOf([this] { markResolved("nested"); }).code, GIT_ERROR);
 }
 
+/// What was put into the index before the failure is not there for the next operation either.
 TEST_F(StagingFailure, OfLineEndsThatWouldBeLostChangesNothing)
 {
     repository_.git({"config", "core.safecrlf", "true"});
     repository_.git({"config", "core.autocrlf", "true"});
     repository_.write("zz", "one\r\ntwo\n");
-    const NothingChanges nothing(repository_);
-    for (const auto &names :
-         {std::vector<std::string>{"zz"}, std::vector<std::string>{"new", "zz"}})
-    {
-        EXPECT_EQ(failureOf([&] { add(names); }),
-                  (Failure{GIT_ERROR, GIT_ERROR_FILTER, "LF would be replaced by CRLF in 'zz'"}));
-    }
-    EXPECT_EQ(failureOf([this] { markResolved("zz"); }).code, GIT_ERROR);
-}
-
-/// What was put into the index before the failure went with the operation.
-TEST_F(StagingFailure, IsForgottenByTheNextOperation)
-{
-    repository_.git({"config", "core.safecrlf", "true"});
-    repository_.git({"config", "core.autocrlf", "true"});
-    repository_.write("zz", "one\r\ntwo\n");
     const auto adapter = makeAdapter(repository_.path());
-    EXPECT_EQ(failureOf([&] { adapter->addFiles(files({"new", "zz"})); }).code, GIT_ERROR);
+    {
+        const NothingChanges nothing(repository_);
+        for (const auto &names :
+             {std::vector<std::string>{"zz"}, std::vector<std::string>{"new", "zz"}})
+            EXPECT_EQ(
+                failureOf([&] { adapter->addFiles(files(names)); }),
+                (Failure{GIT_ERROR, GIT_ERROR_FILTER, "LF would be replaced by CRLF in 'zz'"}));
+        EXPECT_EQ(failureOf([this] { markResolved("zz"); }).code, GIT_ERROR);
+    }
     adapter->removeFiles(files({"file"}));
     EXPECT_EQ(states(repository_, {"file", "new", "zz"}),
               (States{{"file", "Deleted"}, {"new", "Unversioned"}, {"zz", "Unversioned"}}));
-}
-
-TEST_F(StagingFailure, OfANameThatGitReservesChangesNothing)
-{
-    repository_.write("git~1", "x");
-    const NothingChanges nothing(repository_);
-    EXPECT_EQ(failureOf(
-                  [this] {
-                      add({"new", "git~1"});
-                  }),
-              (Failure{GIT_ERROR, GIT_ERROR_INDEX, "invalid path: 'git~1'"}));
 }
 
 TEST_F(StagingFailure, OfAFileThatCannotBeReadChangesNothing)
@@ -234,14 +197,43 @@ TEST_F(StagingFailure, OfARootThatCannotBeOpenedIsRaised)
     EXPECT_EQ(failureOf([&] { missing->addFiles({file}); }), failure);
     EXPECT_EQ(failureOf([&] { missing->removeFiles({file}); }), failure);
     EXPECT_EQ(failureOf([&] { missing->markResolved(file); }), failure);
+    EXPECT_EQ(failureOf([&] { missing->revertFiles({file}); }), failure);
     EXPECT_EQ(failureOf([&] { missing->markResolved(asPath(repository_ / "file")); }), failure);
     EXPECT_FALSE(fs::exists(folder() / "missing"));
+}
+
+TEST_F(StagingFailure, OfABareRepositoryChangesNothing)
+{
+    const std::string bare = folder() / "bare";
+    repository_.git({"clone", "--quiet", "--bare", repository_.path().string(), bare});
+    const auto adapter = makeAdapter(bare);
+    const std::vector<upath> file{asPath(bare + "/file")};
+    EXPECT_NO_THROW(adapter->addFiles({asPath(bare + "/config")}));
+    EXPECT_THROW(adapter->removeFiles(file), TagException<NoFilesToRemove>);
+    EXPECT_EQ(failureOf([&] { adapter->markResolved(asPath(bare + "/config")); }).code,
+              GIT_EBAREREPO);
+    EXPECT_FALSE(fs::exists(bare + "/index"));
+    EXPECT_EQ(
+        failureOf([&] { adapter->revertFiles(file); }),
+        (Failure{GIT_EBAREREPO, GIT_ERROR_REPOSITORY,
+                 "cannot checkout. This operation is not allowed against bare repositories."}));
+}
+
+TEST_F(StagingFailure, OfALoopOfLinksChangesNothing)
+{
+    repository_.symlink("loop", "loop");
+    const NothingChanges nothing(repository_);
+    using boost::filesystem::filesystem_error;
+    EXPECT_THROW(add({"new", "loop"}), filesystem_error);
+    EXPECT_THROW(remove({"file", "loop"}), filesystem_error);
+    EXPECT_THROW(markResolved("loop"), filesystem_error);
+    EXPECT_THROW(revert({"file", "loop"}), filesystem_error);
 }
 
 TEST_F(StagingFailure, OfABrokenConfigurationIsRaisedAndChangesNothing)
 {
     const std::string config = repository_.read(".git/config");
-    const auto index = vclink::test::indexStampOf(repository_);
+    const auto index = indexStampOf(repository_);
     repository_.write(".git/config", "[core\n");
     for (const auto &[name, operation] : operations())
     {
@@ -252,7 +244,7 @@ TEST_F(StagingFailure, OfABrokenConfigurationIsRaisedAndChangesNothing)
                                inGit("config") + ":1)"}));
     }
     repository_.write(".git/config", config);
-    EXPECT_EQ(vclink::test::indexStampOf(repository_), index);
+    EXPECT_EQ(indexStampOf(repository_), index);
 }
 
 /// The state query gives no states then, so that there is nothing to do for it.
@@ -260,14 +252,14 @@ TEST_F(StagingFailure, OfABrokenIndexLeavesItAsItIs)
 {
     repository_.write(".git/index",
                       "this is no index, and long enough to be told from an empty one");
-    const auto index = vclink::test::stampOf(repository_ / ".git/index");
+    const auto index = stampOf(repository_ / ".git/index");
     EXPECT_NO_THROW(add({"new"}));
     EXPECT_THROW(remove({"file"}), TagException<NoFilesToRemove>);
     EXPECT_EQ(failureOf([this] { markResolved("conflicted"); }),
               (Failure{GIT_ERROR, GIT_ERROR_INDEX,
                        "invalid data in index - incorrect header signature"}));
     EXPECT_EQ(failureOf([this] { markResolved("missing"); }).code, GIT_ERROR);
-    EXPECT_EQ(vclink::test::stampOf(repository_ / ".git/index"), index);
+    EXPECT_EQ(stampOf(repository_ / ".git/index"), index);
 }
 
 TEST_F(StagingFailure, OfAnIndexThatLibGit2CannotReadLeavesItAsItIs)
@@ -278,21 +270,6 @@ TEST_F(StagingFailure, OfAnIndexThatLibGit2CannotReadLeavesItAsItIs)
     EXPECT_THROW(remove({"file"}), TagException<NoFilesToRemove>);
     EXPECT_EQ(failureOf([this] { markResolved("file"); }),
               (Failure{GIT_ERROR, GIT_ERROR_INDEX, "unsupported mandatory extension: 'link'"}));
-}
-
-TEST_F(StagingFailure, LeavesNoDescriptorOpen)
-{
-    const auto runAll = [this]
-    {
-        for (const auto &[name, operation] : operations())
-            failureOf(operation);
-        EXPECT_THROW(add({"file"}), TagException<shared_vclink::git::AlreadyAdded>);
-        EXPECT_THROW(remove({}), TagException<NoFilesToRemove>);
-    };
-    repository_.write(".git/index.lock", "");
-    runAll();
-    const vclink::test::NoDescriptorLeak noLeak;
-    runAll();
 }
 
 } // namespace

@@ -1,5 +1,4 @@
 // SPDX-License-Identifier: MIT
-#include <filesystem>
 #include <string>
 #include <vector>
 
@@ -12,11 +11,9 @@ namespace
 {
 
 using vclink::ApplicationInteractor;
-using vclink::test::asBytes;
-using vclink::test::asPath;
-using vclink::test::States;
+using namespace vclink::test;
 
-class StateKeys : public vclink::test::AdapterFixture
+class StateKeys : public AdapterFixture
 {
   protected:
     StateKeys()
@@ -33,7 +30,7 @@ class StateKeys : public vclink::test::AdapterFixture
         return states.empty() ? std::string() : asBytes(states.begin()->first);
     }
 
-    vclink::test::GitRepository repository_ = makeRepository();
+    GitRepository repository_ = makeRepository();
     const std::string real_ = repository_.path();
     const std::string link_ = folder() / "link";
 };
@@ -59,7 +56,7 @@ TEST_F(StateKeys, AreTheSameFilesUnderEitherNameOfTheRoot)
     EXPECT_EQ(onlyKey(link_, real_ + "/sub/file"), link_ + "/sub/file");
     EXPECT_EQ(onlyKey(real_, link_ + "/sub/file"), real_ + "/sub/file");
     const auto states = makeAdapter(link_)->getFolderStates(asPath(real_ + "/sub"));
-    EXPECT_EQ(vclink::test::statesBelow(link_, states), (States{{"sub/file", "Clean"}}));
+    EXPECT_EQ(statesBelow(link_, states), (States{{"sub/file", "Clean"}}));
 }
 
 TEST_F(StateKeys, CarryTheRootsBoolean)

@@ -1,6 +1,5 @@
 // SPDX-License-Identifier: MIT
 // The calls of libgit2 that a status query makes.
-#include <exception>
 #include <functional>
 #include <memory>
 #include <stdexcept>
@@ -11,7 +10,6 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "error/errorUtil/GitErrorPolicy.hpp"
 #include "error/errorUtil/GitResult.hpp"
 #include "error/errorUtil/callbackException.hpp"
 #include "error/errorUtil/libgit2Errors.hpp"
@@ -32,10 +30,7 @@ using testing::ElementsAre;
 using testing::HasSubstr;
 using vclink::git::LibGit2Exception;
 using vclink::git::pendingCallbackException;
-using vclink::test::asPath;
-using vclink::test::LibGit2Recorder;
-using vclink::test::LogCapture;
-using vclink::test::States;
+using namespace vclink::test;
 
 /// Stands in front of the library's own callback and throws when it has passed some paths on.
 class ThrowingCallback
@@ -55,7 +50,7 @@ class ThrowingCallback
     std::function<void()> raise;
 };
 
-class StatusWalk : public vclink::test::AdapterFixture
+class StatusWalk : public AdapterFixture
 {
   protected:
     StatusWalk()
@@ -72,8 +67,8 @@ class StatusWalk : public vclink::test::AdapterFixture
 
     States query()
     {
-        return vclink::test::statesBelow(repository_.path(),
-                                         adapter_->getFolderStates(adapter_->getRootFolder()));
+        return statesBelow(repository_.path(),
+                           adapter_->getFolderStates(adapter_->getRootFolder()));
     }
 
     /// Lets the walk raise in its callback after `count` paths.
@@ -94,7 +89,7 @@ class StatusWalk : public vclink::test::AdapterFixture
             });
     }
 
-    vclink::test::GitRepository repository_ = makeRepository();
+    GitRepository repository_ = makeRepository();
     std::unique_ptr<vclink::git::GitAdapter> adapter_;
     LibGit2Recorder calls_;
     ThrowingCallback throwing_;
@@ -114,7 +109,7 @@ TEST_F(StatusWalk, OpensAfterTheOptionsAndReleasesAtTheEnd)
 
 TEST_F(StatusWalk, AsksForTheOptionsFirst)
 {
-    const auto factory = std::make_shared<vclink::test::TestOptionsFactory>(interactor_);
+    const auto factory = std::make_shared<TestOptionsFactory>(interactor_);
     factory->onStatusOptions = [this] { calls_.note("makeStatusOptions"); };
     vclink::git::GitAdapter adapter(asPath(folder() / "missing"), factory);
     calls_.clear();
@@ -126,7 +121,7 @@ TEST_F(StatusWalk, AsksForTheOptionsFirst)
                                    "git_repository_open_ext"));
 }
 
-TEST_F(StatusWalk, OpensTheRootItselfWithoutASearch)
+TEST_F(StatusWalk, OpensTheRootItselfWithoutASearchAsTheOtherOperationsDo)
 {
     std::vector<std::string> paths;
     calls_.on<git_repository_open_ext>(
@@ -139,10 +134,15 @@ TEST_F(StatusWalk, OpensTheRootItselfWithoutASearch)
         });
     query();
     static_cast<void>(adapter_->getRepository());
-    EXPECT_THAT(paths, ElementsAre(repository_.path().string(), repository_.path().string()));
+    const upath file = asPath(repository_ / "a");
+    adapter_->addFiles({file});
+    adapter_->markResolved(file);
+    adapter_->revertFiles({file});
+    // With a query before an addition and before a revert.
+    EXPECT_EQ(paths, std::vector<std::string>(7, repository_.path().string()));
 }
 
-TEST_F(StatusWalk, GivesTheStatesUpToAFailureOfLibGit2)
+TEST_F(StatusWalk, GivesTheStatesUpToAFailureOfLibGit2WithoutARecord)
 {
     for (const int code : {-1, -3, -7, -31, 1})
     {
@@ -154,17 +154,11 @@ TEST_F(StatusWalk, GivesTheStatesUpToAFailureOfLibGit2)
                 callback("b", GIT_STATUS_WT_NEW, payload);
                 return code;
             });
+        const LogCapture log(0x08 | 0x10);
         EXPECT_EQ(query(), twoStates) << code;
+        EXPECT_THAT(log.messages(), ElementsAre());
+        EXPECT_EQ(calls_.steps().back(), "git_repository_free");
     }
-}
-
-TEST_F(StatusWalk, NeitherLogsNorRaisesAFailureAndReleasesTheRepository)
-{
-    calls_.answer<git_status_foreach_ext>([](auto...) { return GIT_ERROR; });
-    const LogCapture log(0x08 | 0x10);
-    EXPECT_EQ(query(), States());
-    EXPECT_THAT(log.messages(), ElementsAre());
-    EXPECT_EQ(calls_.steps().back(), "git_repository_free");
 }
 
 TEST_F(StatusWalk, GivesTheStatesUpToAnExceptionInTheCallbackAndWorksAgain)
@@ -237,7 +231,7 @@ struct Asked
 };
 
 /// The record that the library hands to a status walk.
-class StatusRecord : public vclink::test::AdapterFixture
+class StatusRecord : public AdapterFixture
 {
   protected:
     StatusRecord()
@@ -257,7 +251,7 @@ class StatusRecord : public vclink::test::AdapterFixture
         adapter_ = makeAdapter(repository_.path());
     }
 
-    vclink::test::GitRepository repository_ = makeRepository();
+    GitRepository repository_ = makeRepository();
     LibGit2Recorder calls_;
     std::vector<Asked> walks_;
     std::unique_ptr<vclink::git::GitAdapter> adapter_;
@@ -280,7 +274,7 @@ TEST_F(StatusRecord, HasTheseFieldsAndHoldsOtherwiseWhatLibGit2Initialises)
     EXPECT_EQ(options.baseline, nullptr);
     EXPECT_TRUE(walks_[0].hasCallback);
     EXPECT_TRUE(walks_[0].hasPayload);
-    if (vclink::test::libgit2Release::setsRenameThreshold)
+    if (libgit2Release::setsRenameThreshold)
     {
         EXPECT_EQ(options.rename_threshold, initialised.rename_threshold);
     }

@@ -1,5 +1,4 @@
 // SPDX-License-Identifier: MIT
-#include <filesystem>
 #include <string>
 
 #include <git2.h>
@@ -7,6 +6,8 @@
 
 #include "error/errorUtil/callbackException.hpp"
 #include "main/AdapterFixture.hpp"
+#include "support/Change.hpp"
+#include "support/Sentence.hpp"
 #include "support/UnprivilegedUser.hpp"
 #include "support/libgit2Release.hpp"
 #include "support/text.hpp"
@@ -16,9 +17,7 @@ namespace
 {
 
 using vclink::git::LibGit2Exception;
-using vclink::test::asPath;
-using vclink::test::GitRepository;
-using vclink::test::States;
+using namespace vclink::test;
 
 /// Code of what the query of the whole tree throws; 0 for none.
 int raisedBy(vclink::git::GitAdapter &adapter)
@@ -35,7 +34,7 @@ int raisedBy(vclink::git::GitAdapter &adapter)
     }
 }
 
-class StatusFailure : public vclink::test::AdapterFixture
+class StatusFailure : public AdapterFixture
 {
   protected:
     StatusFailure()
@@ -72,12 +71,11 @@ TEST_F(StatusFailure, OfAFormatThatLibGit2DoesNotKnowIsRaised)
     EXPECT_EQ(raisedBy(*makeAdapter(repository_.path())), GIT_ERROR);
     const auto sha256 = folder() / "sha256";
     repository_.git({"init", "--quiet", "--object-format=sha256", sha256.string()});
-    EXPECT_EQ(raisedBy(*makeAdapter(sha256)), vclink::test::libgit2Release::refusalOfSha256);
+    EXPECT_EQ(raisedBy(*makeAdapter(sha256)), libgit2Release::refusalOfSha256);
     const auto extended = makeRepository("extended");
     extended.git({"config", "core.repositoryFormatVersion", "1"});
     extended.git({"config", "extensions.worktreeConfig", "true"});
-    EXPECT_EQ(raisedBy(*makeAdapter(extended.path())),
-              vclink::test::libgit2Release::refusalOfWorktreeConfig);
+    EXPECT_EQ(raisedBy(*makeAdapter(extended.path())), libgit2Release::refusalOfWorktreeConfig);
 }
 
 TEST_F(StatusFailure, DoesNotComeOfALockedIndex)
@@ -97,10 +95,10 @@ TEST_F(StatusFailure, OfAnUntrackedFolderThatCannotBeReadLeavesItOut)
 {
     repository_.write("locked/inside", "x");
     repository_.setMode("locked", 0000);
-    vclink::test::giveToUnprivilegedUser(repository_.path());
-    EXPECT_EQ(vclink::test::runAsUnprivilegedUser(
-                  [this] { return testing::PrintToString(allStates(repository_)); }),
-              testing::PrintToString(States{{"file", "Clean"}, {"new", "Unversioned"}}));
+    giveToUnprivilegedUser(repository_.path());
+    EXPECT_EQ(
+        runAsUnprivilegedUser([this] { return testing::PrintToString(allStates(repository_)); }),
+        testing::PrintToString(States{{"file", "Clean"}, {"new", "Unversioned"}}));
 }
 
 TEST_F(StatusFailure, OfATrackedFolderThatCannotBeReadTellsItsFilesAsMissing)
@@ -108,34 +106,23 @@ TEST_F(StatusFailure, OfATrackedFolderThatCannotBeReadTellsItsFilesAsMissing)
     repository_.write("locked/inside", "x");
     repository_.commitAll("second");
     repository_.setMode("locked", 0000);
-    vclink::test::giveToUnprivilegedUser(repository_.path());
-    EXPECT_EQ(vclink::test::runAsUnprivilegedUser(
-                  [this] { return testing::PrintToString(allStates(repository_)); }),
-              testing::PrintToString(
-                  States{{"file", "Clean"}, {"locked/inside", "Missing"}, {"new", "Clean"}}));
+    giveToUnprivilegedUser(repository_.path());
+    EXPECT_EQ(
+        runAsUnprivilegedUser([this] { return testing::PrintToString(allStates(repository_)); }),
+        testing::PrintToString(
+            States{{"file", "Clean"}, {"locked/inside", "Missing"}, {"new", "Clean"}}));
 }
 
-void breakIndex(GitRepository &repository)
-{
-    repository.write(".git/index",
-                     "this is no index, and long enough to be told from an empty one");
-}
-
-void truncateIndex(GitRepository &repository)
+void truncateIndex(const GitRepository &repository)
 {
     const std::string index = repository.read(".git/index");
     repository.write(".git/index", index.substr(0, index.size() / 2));
 }
 
-void splitIndex(GitRepository &repository)
-{
-    repository.git({"update-index", "--split-index"});
-}
-
-void makeIndexSparse(GitRepository &repository)
+void makeIndexSparse(const GitRepository &repository)
 {
     repository.write("sub/inside", "x");
-    repository.commitAll("second");
+    GitRepository(repository).commitAll("second");
     repository.git({"config", "index.sparse", "true"});
     repository.git({"config", "core.sparseCheckoutCone", "true"});
     repository.git({"config", "core.sparseCheckout", "true"});
@@ -144,7 +131,7 @@ void makeIndexSparse(GitRepository &repository)
     ASSERT_NE(repository.git({"ls-files", "--sparse"}).find("sub/\n"), std::string::npos);
 }
 
-void breakTree(GitRepository &repository)
+void breakTree(const GitRepository &repository)
 {
     const std::string tree = repository.line({"rev-parse", "HEAD^{tree}"});
     const std::string object = ".git/objects/" + tree.substr(0, 2) + "/" + tree.substr(2);
@@ -152,16 +139,10 @@ void breakTree(GitRepository &repository)
     repository.write(object, "this is no object");
 }
 
-void breakHead(GitRepository &repository)
-{
-    repository.write(".git/HEAD", "no reference\n");
-}
-
 /// What only the walk meets.
-struct BrokenPart
+struct BrokenPart : Sentence
 {
-    const char *sentence;
-    void (*breakIt)(GitRepository &);
+    Change breakIt;
 };
 
 class StatusOf : public StatusFailure, public testing::WithParamInterface<BrokenPart>
@@ -177,12 +158,16 @@ TEST_P(StatusOf, IsAnEmptyMapAndNoExceptionWaits)
 }
 
 const BrokenPart brokenParts[]{
-    {"ABrokenIndex", breakIndex}, {"ATruncatedIndex", truncateIndex},
-    {"ASplitIndex", splitIndex},  {"ASparseIndex", makeIndexSparse},
-    {"ABrokenTree", breakTree},   {"AHeadThatIsGarbage", breakHead},
+    {{"ABrokenIndex"},
+     writes(".git/index", "this is no index, and long enough to be told from an empty one")},
+    {{"ATruncatedIndex"}, truncateIndex},
+    {{"ASplitIndex"}, runsGit({"update-index", "--split-index"})},
+    {{"ASparseIndex"}, makeIndexSparse},
+    {{"ABrokenTree"}, breakTree},
+    {{"AHeadThatIsGarbage"}, writes(".git/HEAD", "no reference\n")},
 };
 
 INSTANTIATE_TEST_SUITE_P(With, StatusOf, testing::ValuesIn(brokenParts),
-                         [](const auto &test) { return test.param.sentence; });
+                         testing::PrintToStringParamName());
 
 } // namespace

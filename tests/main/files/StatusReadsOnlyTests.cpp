@@ -73,31 +73,19 @@ class StatusReadsOnly : public vclink::test::AdapterFixture
     vclink::test::GitRepository repository_ = makeRepository();
 };
 
-TEST_F(StatusReadsOnly, AndWritesNothingIntoTheFolder)
+TEST_F(StatusReadsOnly, AndWritesNothingAndChangesNothingOfTheHost)
 {
     const auto adapter = makeAdapter(repository_.path());
     const auto before = photograph(repository_.path());
-    query(*adapter);
-    EXPECT_EQ(photograph(repository_.path()), before);
-}
-
-TEST_F(StatusReadsOnly, AndChangesNothingThatGitSees)
-{
-    const auto adapter = makeAdapter(repository_.path());
-    query(*adapter);
-    EXPECT_EQ(repository_.git({"status", "--porcelain", "--untracked-files=all"}),
-              " M edited\n D gone\nM  sub/staged\n?? new/file\n");
-}
-
-TEST_F(StatusReadsOnly, AndChangesNothingOfTheHost)
-{
-    const auto adapter = makeAdapter(repository_.path());
-    const fs::path before = fs::current_path();
+    const fs::path current = fs::current_path();
     const auto home = photograph(environment().home());
     query(*adapter);
-    EXPECT_EQ(fs::current_path(), before);
+    EXPECT_EQ(photograph(repository_.path()), before);
+    EXPECT_EQ(fs::current_path(), current);
     EXPECT_EQ(photograph(environment().home()), home);
     EXPECT_TRUE(fs::is_empty(environment().temporary()));
+    EXPECT_EQ(repository_.git({"status", "--porcelain", "--untracked-files=all"}),
+              " M edited\n D gone\nM  sub/staged\n?? new/file\n");
 }
 
 } // namespace

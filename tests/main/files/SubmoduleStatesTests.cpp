@@ -8,10 +8,9 @@
 namespace
 {
 
-using vclink::test::GitRepository;
-using vclink::test::States;
+using namespace vclink::test;
 
-class SubmoduleStates : public vclink::test::AdapterFixture
+class SubmoduleStates : public AdapterFixture
 {
   protected:
     SubmoduleStates()
@@ -38,41 +37,30 @@ class SubmoduleStates : public vclink::test::AdapterFixture
     GitRepository repository_ = makeRepository();
 };
 
-TEST_F(SubmoduleStates, OfAnUnchangedOneIsClean)
+TEST_F(SubmoduleStates, OfAnUnchangedOneIsCleanAndOfOneWhoseFolderIsGoneMissing)
 {
     expectState("Clean");
+    repository_.git({"submodule", "--quiet", "deinit", "--force", "module"});
+    expectState("Clean");
+    repository_.remove("module");
+    expectState("Missing");
 }
 
-TEST_F(SubmoduleStates, OfOneAtAnotherCommitIsModified)
+TEST_F(SubmoduleStates, OfOneAtAnotherCommitOrWithChangedFilesIsModified)
 {
     module().git({"checkout", "--quiet", "HEAD~1"});
     expectState("Modified");
     repository_.add({"module"});
     expectState("Modified");
-}
-
-TEST_F(SubmoduleStates, OfOneWithAnEditedFileIsModified)
-{
-    module().write("file", "edited");
-    expectState("Modified");
-}
-
-TEST_F(SubmoduleStates, OfOneWithAnUntrackedFileIsModified)
-{
-    module().write("new", "x");
-    expectState("Modified");
-}
-
-TEST_F(SubmoduleStates, OfOneThatIsNotCheckedOutIsClean)
-{
-    repository_.git({"submodule", "--quiet", "deinit", "--force", "module"});
+    repository_.commit("another");
     expectState("Clean");
-}
-
-TEST_F(SubmoduleStates, OfOneWhoseFolderIsGoneIsMissing)
-{
-    repository_.remove("module");
-    expectState("Missing");
+    for (const auto *name : {"file", "new"})
+    {
+        module().write(name, "edited");
+        expectState("Modified");
+        module().git({"stash", "--quiet", "--include-untracked"});
+        expectState("Clean");
+    }
 }
 
 TEST_F(SubmoduleStates, OfANewOneIsAdded)

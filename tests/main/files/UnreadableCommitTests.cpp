@@ -47,6 +47,9 @@ class UnreadableTest : public vclink::test::CommitFixture
         return "-14 2 failed " + call + " - '" + (repository_ / name).string() +
                "' is locked: Permission denied";
     }
+
+    const std::string lowestText_ =
+        "-1 2 could not read 'sub/deep/lowest', which is tracked: Permission denied";
 };
 
 class UnreadableCommit : public UnreadableTest
@@ -65,20 +68,23 @@ TEST_F(UnreadableCommit, IsMadeWhereEverythingCanBeRead)
     EXPECT_EQ(committed("file"), "changed\n");
 }
 
-TEST_F(UnreadableCommit, IsRefusedOverAFolderWithoutAnyPermission)
+/// Folders without any permission, that can be entered and not listed, and listed and not entered;
+/// a file that changed and one that did not; the root; and a folder beside a file that is deleted.
+TEST_F(UnreadableCommit, IsRefusedOverWhatCannotBeRead)
 {
-    expectRefused("sub", 0000,
-                  "-1 2 could not read 'sub/deep/lowest', which is tracked: Permission denied");
-    expectRefused("sub/deep", 0000,
-                  "-1 2 could not read 'sub/deep/lowest', which is tracked: Permission denied");
-}
-
-TEST_F(UnreadableCommit, IsRefusedOverAFolderThatCanBeEnteredAndNotListed)
-{
-    expectRefused("sub", 0311,
-                  "-1 2 could not read 'sub/deep/lowest', which is tracked: Permission denied");
-    expectRefused("sub/deep", 0311,
-                  "-1 2 could not read 'sub/deep/lowest', which is tracked: Permission denied");
+    for (const auto *name : {"sub", "sub/deep"})
+    {
+        expectRefused(name, 0000, lowestText_);
+        expectRefused(name, 0311, lowestText_);
+    }
+    expectRefused("sub/deep", 0644, lockedText("stat", "sub/deep/lowest"));
+    expectRefused("file", 0000, lockedText("open", "file"));
+    expectRefused("other", 0000, lockedText("open", "other"));
+    expectRefused("", 0311,
+                  "-3 2 failed to open directory '" + repository_.path().string() +
+                      "/': Permission denied");
+    repository_.remove("other");
+    expectRefused("sub", 0000, lowestText_);
 }
 
 /// What counts is the user by whose rights files are opened.
@@ -93,35 +99,6 @@ TEST_F(UnreadableCommit, IsRefusedWhateverTheRealUserMayRead)
     ASSERT_EQ(::seteuid(before), 0);
     repository_.setMode("sub", 0755);
     EXPECT_EQ(repository_.git({"diff", "--cached", "--name-only"}), "");
-}
-
-TEST_F(UnreadableCommit, IsRefusedOverAFolderThatCanBeListedAndNotEntered)
-{
-    expectRefused("sub/deep", 0644, lockedText("stat", "sub/deep/lowest"));
-}
-
-TEST_F(UnreadableCommit, IsRefusedOverAFileThatChanged)
-{
-    expectRefused("file", 0000, lockedText("open", "file"));
-}
-
-TEST_F(UnreadableCommit, IsRefusedOverAFileThatDidNotChange)
-{
-    expectRefused("other", 0000, lockedText("open", "other"));
-}
-
-TEST_F(UnreadableCommit, IsRefusedOverARootThatCannotBeListed)
-{
-    const NothingChanges nothing(repository_);
-    EXPECT_EQ(commitWithMode("", 0311), "-3 2 failed to open directory '" +
-                                            repository_.path().string() + "/': Permission denied");
-}
-
-TEST_F(UnreadableCommit, IsRefusedAlsoWhereAnotherFileIsDeleted)
-{
-    repository_.remove("other");
-    expectRefused("sub", 0000,
-                  "-1 2 could not read 'sub/deep/lowest', which is tracked: Permission denied");
 }
 
 TEST_F(UnreadableCommit, DropsAFileThatIsGoneFromAFolderThatCannotBeListed)
@@ -158,12 +135,13 @@ class UnreadableMergeConclusion : public UnreadableTest
     }
 };
 
-TEST_F(UnreadableMergeConclusion, IsRefusedAndTheMergeStaysUnderWay)
+TEST_F(UnreadableMergeConclusion, IsRefusedAndTheMergeStaysUnderWayUntilItCanBeRead)
 {
-    expectRefused("sub", 0000,
-                  "-1 2 could not read 'sub/deep/lowest', which is tracked: Permission denied");
+    expectRefused("sub", 0000, lowestText_);
     EXPECT_EQ(repository_.read(".git/MERGE_HEAD"), idOf("theirs") + '\n');
     EXPECT_NE(repository_.git({"ls-files", "--unmerged"}), "");
+    EXPECT_EQ(commitAsItsOwner(), "committed");
+    EXPECT_EQ(parents().size(), 2U);
 }
 
 TEST_F(UnreadableMergeConclusion, IsRefusedOverAConflictThatCannotBeRead)
@@ -172,13 +150,6 @@ TEST_F(UnreadableMergeConclusion, IsRefusedOverAConflictThatCannotBeRead)
     vclink::test::giveToUnprivilegedUser(repository_.path());
     expectRefused("sub", 0000,
                   "-1 2 could not read 'sub/inside', which is tracked: Permission denied");
-}
-
-TEST_F(UnreadableMergeConclusion, IsMadeOnceItCanBeReadAgain)
-{
-    EXPECT_NE(commitWithMode("sub", 0000), "committed");
-    EXPECT_EQ(commitAsItsOwner(), "committed");
-    EXPECT_EQ(parents().size(), 2U);
 }
 
 } // namespace

@@ -15,10 +15,9 @@ namespace
 {
 
 using testing::ElementsAre;
-using vclink::test::RepositoryState;
-using vclink::test::stateOf;
+using namespace vclink::test;
 
-class UnwrittenCommit : public vclink::test::CommitFixture
+class UnwrittenCommit : public CommitFixture
 {
   protected:
     /// Text that compression leaves long.
@@ -44,8 +43,7 @@ class UnwrittenCommit : public vclink::test::CommitFixture
     }
     static std::string fileTooLarge()
     {
-        return vclink::test::printed(
-            {GIT_ERROR, GIT_ERROR_OS, "failed to write out file: File too large"});
+        return printed({GIT_ERROR, GIT_ERROR_OS, "failed to write out file: File too large"});
     }
 };
 

@@ -2,7 +2,6 @@
 #include <csignal>
 #include <cstddef>
 #include <filesystem>
-#include <functional>
 #include <string>
 #include <vector>
 
@@ -14,7 +13,6 @@
 
 #include "MergeFixture.hpp"
 #include "support/Command.hpp"
-#include "support/text.hpp"
 
 namespace
 {

@@ -4,6 +4,7 @@
 #include <filesystem>
 #include <functional>
 #include <memory>
+#include <optional>
 #include <string>
 #include <utility>
 #include <vector>
@@ -62,6 +63,13 @@ class MovedHead : public BranchCallsFixture
             moved_ = idOf("HEAD");
         }
     }
+    /// Has the late commit made just before this call of libgit2.
+    template <auto Function> void moveHeadBefore()
+    {
+        beginLateCommit();
+        calls_.emplace();
+        calls_->on<Function>([this](auto...) { moveHead(); });
+    }
     /// Everything is as git's commit has left it.
     void expectUntouched() const
     {
@@ -109,14 +117,15 @@ class MovedHead : public BranchCallsFixture
 
     std::unique_ptr<LateCommit> late_;
     std::string moved_;
+
+  private:
+    std::optional<LibGit2Recorder> calls_;
 };
 
 TEST_F(MovedHead, RefusesASwitchBeforeItWrites)
 {
     makeTopic(false);
-    beginLateCommit();
-    LibGit2Recorder calls;
-    calls.on<git_checkout_tree>([this](auto...) { moveHead(); });
+    moveHeadBefore<git_checkout_tree>();
     EXPECT_EQ(failureOf([this] { branches().switchBranch("topic"); }),
               (Failure{GIT_EMODIFIED, GIT_ERROR_REFERENCE, git::Head::movedText}));
     expectUntouched();
@@ -128,9 +137,7 @@ TEST_F(MovedHead, RefusesASwitchBeforeItWrites)
 TEST_F(MovedHead, RefusesAFastForwardBeforeItWrites)
 {
     makeTopic(false);
-    beginLateCommit();
-    LibGit2Recorder calls;
-    calls.on<git_checkout_tree>([this](auto...) { moveHead(); });
+    moveHeadBefore<git_checkout_tree>();
     EXPECT_EQ(failureOfMerge("topic"), movedText());
     expectUntouched();
     merge("topic");
@@ -156,9 +163,7 @@ TEST_F(MovedHead, RefusesAFastForwardOfABranchThatIsNoLongerTheCurrentOne)
 TEST_F(MovedHead, RefusesAFastForwardThatHasLookedAtAnotherCommit)
 {
     makeTopic(false);
-    beginLateCommit();
-    LibGit2Recorder calls;
-    calls.on<git_object_lookup>([this](auto...) { moveHead(); });
+    moveHeadBefore<git_object_lookup>();
     EXPECT_EQ(failureOfMerge("topic"), movedText());
     expectUntouched();
 }
@@ -167,9 +172,7 @@ TEST_F(MovedHead, RefusesAFastForwardThatHasLookedAtAnotherCommit)
 TEST_F(MovedHead, KeepsWhatWasCommittedSinceTheLookBeforeAFastForward)
 {
     makeBranch("topic", [this] { repository_.remove("other"); });
-    beginLateCommit();
-    LibGit2Recorder calls;
-    calls.on<git_checkout_tree>([this](auto...) { moveHead(); });
+    moveHeadBefore<git_checkout_tree>();
     EXPECT_NE(failureOfMerge("topic"), "");
     EXPECT_EQ(idOf("main"), moved_);
     expectLateKept();
@@ -178,9 +181,7 @@ TEST_F(MovedHead, KeepsWhatWasCommittedSinceTheLookBeforeAFastForward)
 TEST_F(MovedHead, KeepsWhatWasCommittedWhileAFastForwardWrote)
 {
     makeTopic(false);
-    beginLateCommit();
-    LibGit2Recorder calls;
-    calls.on<git_reference_set_target>([this](auto...) { moveHead(); });
+    moveHeadBefore<git_reference_set_target>();
     EXPECT_THAT(failureOfMerge("topic"), HasSubstr("old reference value does not match"));
     EXPECT_EQ(idOf("main"), moved_);
     expectLateKept();
@@ -189,9 +190,7 @@ TEST_F(MovedHead, KeepsWhatWasCommittedWhileAFastForwardWrote)
 TEST_F(MovedHead, RefusesAMergeBeforeItWrites)
 {
     makeTopic(true);
-    beginLateCommit();
-    LibGit2Recorder calls;
-    calls.on<git_merge>([this](auto...) { moveHead(); });
+    moveHeadBefore<git_merge>();
     EXPECT_EQ(failureOfMerge("topic"), movedText());
     expectUntouched();
     merge("topic");
@@ -309,9 +308,7 @@ TEST_F(MovedHead, LeavesAnotherMergeThatAnotherProcessHasBegun)
 TEST_F(MovedHead, RefusesACommitThatWouldReplaceTheOther)
 {
     repository_.write("file", "edited\n");
-    beginLateCommit();
-    LibGit2Recorder calls;
-    calls.on<git_commit_create>([this](auto...) { moveHead(); });
+    moveHeadBefore<git_commit_create>();
     EXPECT_EQ(failureOf([this] { adapter_->commit(upath(), u"message"); }).code, GIT_EMODIFIED);
     EXPECT_EQ(idOf("main"), moved_);
     expectLateKept();

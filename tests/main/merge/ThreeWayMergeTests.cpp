@@ -2,7 +2,6 @@
 #include <filesystem>
 #include <memory>
 #include <string>
-#include <vector>
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>

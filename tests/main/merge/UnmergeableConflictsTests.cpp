@@ -1,6 +1,5 @@
 // SPDX-License-Identifier: MIT
 #include <algorithm>
-#include <filesystem>
 #include <string>
 #include <vector>
 

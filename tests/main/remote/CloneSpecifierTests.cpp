@@ -1,7 +1,6 @@
 // SPDX-License-Identifier: MIT
 // What a clone is made of and where it goes.
 #include <filesystem>
-#include <memory>
 #include <string>
 #include <vector>
 

@@ -2,7 +2,6 @@
 #include <string>
 #include <vector>
 
-#include <git2.h>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 

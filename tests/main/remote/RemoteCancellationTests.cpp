@@ -1,6 +1,5 @@
 // SPDX-License-Identifier: MIT
 // A fetch that is stopped, and what the other poller of the adapter still holds then.
-#include <string>
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>

@@ -148,6 +148,13 @@ class BlockedSigpipe
     std::_Exit(error == EPIPE && !isBlocked(SIGPIPE) && !isPending() ? 0 : 1);
 }
 
+void breakGuardedConnection()
+{
+    const SigpipeBlock guard;
+    const ResetConnection connection;
+    EXPECT_EQ(connection.writeUntilBroken(), EPIPE);
+}
+
 /// Sets every bit where the variables of the next call will be.
 [[gnu::noinline]] void leaveBitsOnTheStack()
 {
@@ -188,11 +195,7 @@ TEST(SigpipeBlock, LeavesASignalBlockedAndPendingThatWasSoAndTakesAwayOneThatCam
     EXPECT_TRUE(isBlocked(SIGPIPE));
     EXPECT_FALSE(isPending());
     ::raise(SIGPIPE);
-    {
-        const SigpipeBlock guard;
-        const ResetConnection connection;
-        EXPECT_EQ(connection.writeUntilBroken(), EPIPE);
-    }
+    breakGuardedConnection();
     EXPECT_TRUE(isPending());
 }
 
@@ -206,11 +209,7 @@ TEST(SigpipeBlock, LeavesTheHostsHandlerAloneAndAsleep)
 {
     handled = 0;
     const test::SignalAction counting(SIGPIPE, countSignal);
-    {
-        const SigpipeBlock guard;
-        const ResetConnection connection;
-        EXPECT_EQ(connection.writeUntilBroken(), EPIPE);
-    }
+    breakGuardedConnection();
     EXPECT_EQ(handled, 0);
     ::raise(SIGPIPE);
     EXPECT_EQ(handled, 1);
@@ -219,11 +218,7 @@ TEST(SigpipeBlock, LeavesTheHostsHandlerAloneAndAsleep)
 TEST(SigpipeBlock, LeavesASignalIgnoredThatWasIgnored)
 {
     const test::SignalAction ignored(SIGPIPE, SIG_IGN);
-    {
-        const SigpipeBlock guard;
-        const ResetConnection connection;
-        EXPECT_EQ(connection.writeUntilBroken(), EPIPE);
-    }
+    breakGuardedConnection();
     EXPECT_FALSE(isPending());
     EXPECT_EQ(::raise(SIGPIPE), 0);
 }
