@@ -1,4 +1,6 @@
 // SPDX-License-Identifier: MIT
+#include <filesystem>
+#include <system_error>
 #include <vector>
 
 #include <CLI/CLI.hpp>
@@ -53,20 +55,35 @@ class AddCommand : public Command
                                                      : explainLink(named, "git add");
                      });
         FileStateMap files;
+        FileStateMap removed;
         for (const NamedPath &named : paths)
         {
             FileStateMap chosen = named.isFolder ? filter(named.states, isNew) : named.states;
+            FileStateMap back = filterBack(root, named.states);
+            for (const auto &entry : back)
+            {
+                chosen.erase(entry.first);
+            }
             files.merge(chosen);
+            removed.merge(back);
         }
         const std::vector<upath> list = addressable(filterFollowed(files, root, false), root);
         refuseStrays(say("Nothing was added"), adapter, paths, list,
                      [](FileState::State state) { return isNew(state) || isInConflict(state); });
         const ExitStatus status = runStoppable(session, Stops::Never,
-                                               [&] { adapter.addFiles(literalNames(list, root)); });
+                                               [&]
+                                               {
+                                                   adapter.addFiles(literalNames(list, root));
+                                                   for (const auto &entry : removed)
+                                                   {
+                                                       adapter.markResolved(entry.first);
+                                                   }
+                                               });
         if (status != Done)
         {
             return status;
         }
+        files.merge(removed);
         const FileStateMap leftOut = findLeftOut(adapter, files, isNew);
         remark(files.empty() ? say("There is no new file to add.")
                              : say("Added %1%.", countFiles(files.size() - leftOut.size())));
@@ -77,6 +94,25 @@ class AddCommand : public Command
     static bool isNew(FileState::State state)
     {
         return state == FileState::Unversioned;
+    }
+
+    /// Files that are removed in the index, but on the disk. To the back end they are not new: it
+    /// stages them as the solution of a conflict.
+    static FileStateMap filterBack(const upath &root, const FileStateMap &states)
+    {
+        FileStateMap back;
+        for (const auto &entry : states)
+        {
+            std::error_code ignored;
+            const auto status = std::filesystem::symlink_status(nativePath(entry.first), ignored);
+            if (entry.second.getState() == FileState::Deleted &&
+                std::filesystem::is_regular_file(status) && isAddressable(entry.first, root) &&
+                !isPattern(relativeName(entry.first, root)) && !isFollowed(entry.first, root))
+            {
+                back.insert(back.end(), entry);
+            }
+        }
+        return back;
     }
 
     const CLI::Option *paths_ = nullptr;

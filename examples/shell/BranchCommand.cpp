@@ -8,8 +8,10 @@
 #include "arguments.hpp"
 #include "commands.hpp"
 #include "failures.hpp"
+#include "names.hpp"
 #include "revisions.hpp"
 #include "runStoppable.hpp"
+#include "suggestions.hpp"
 #include "texts.hpp"
 #include "vclink/git/BranchManager.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
@@ -52,6 +54,11 @@ class BranchCommand : public Command
         const std::string name = name_->results().front();
         // The way back from a deletion.
         const std::string tip = findRevision(*manager, "refs/heads/" + name).value_or("");
+        if (deletes_ && !isBranch(*manager, name))
+        {
+            throw ShellFailure(say("There is no branch '%1%'.", showName(name)) +
+                               suggestBranch(*manager, name));
+        }
         try
         {
             const ExitStatus status =
@@ -65,6 +72,16 @@ class BranchCommand : public Command
         }
         catch (const git::LibGit2Exception &)
         {
+            if (!deletes_ && !findRevision(*manager, start()))
+            {
+                if (start() == "HEAD")
+                {
+                    throw ShellFailure(say("There is no commit yet that a branch could begin at."));
+                }
+                throw ShellFailure(
+                    say("There is no branch and no commit '%1%'.", showName(start())) +
+                    suggestBranch(*manager, start()));
+            }
             if (deletes_ || !isUnnamedCommit(*manager, start()))
             {
                 throw;

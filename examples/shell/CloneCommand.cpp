@@ -21,12 +21,25 @@ namespace vclink::shell
 namespace
 {
 
+/// As git reads an address: a colon before the first slash ends a scheme or a host.
+bool isPath(const std::string &argument)
+{
+    const std::size_t colon = argument.find(':');
+    return colon == std::string::npos || argument.find('/') < colon;
+}
+
 /// The address of what exists on this machine is made absolute, as by git: the clone remembers it,
 /// and is used from other folders.
+/// @throws ShellFailure if it is the path of nothing
 ustring readSpecifier(const std::string &argument)
 {
     std::error_code error;
     const std::filesystem::path local = std::filesystem::canonical(argument, error);
+    if (error && isPath(argument))
+    {
+        throw ShellFailure(say("Nothing was cloned: %1% can't be found: %2%.",
+                               quoteName(fl::i18n::utf8_to_ustring(argument)), error.message()));
+    }
     return fl::i18n::utf8_to_ustring(error ? argument : local.string());
 }
 
@@ -74,9 +87,9 @@ class CloneCommand : public Command
     ExitStatus run(Session &session) override
     {
         const std::string &argument = specifier_->results().front();
+        const ustring specifier = readSpecifier(argument);
         const std::filesystem::path folder =
             resolveArgument(folder_->empty() ? nameFor(argument) : folder_->results().front());
-        const ustring specifier = readSpecifier(argument);
         const auto generator = session.factory().createWorkingCopyGenerator(session.interactor());
         const std::string text = say("Cloning into %1%:", quoteName(makePath(folder).string()));
         remark(text);

@@ -124,7 +124,15 @@ void CommandLine::declareSettings()
     // Read before the line is, see findLocale().
     line_
         ->add_option_function<std::string>(
-            "--lang", [](const std::string & /*locale*/) {},
+            "--lang",
+            [](const std::string &locale)
+            {
+                if (!isLanguage(locale))
+                {
+                    throw CLI::ValidationError(
+                        "--lang", say("\"%1%\" is none of the languages en, de and ja", locale));
+                }
+            },
             say("Use the language of this locale: en, de or ja"))
         ->type_name("LOCALE");
     line_
@@ -258,7 +266,7 @@ std::string CommandLine::describe(const CLI::ParseError &error) const
         return text.find("At Most") == std::string::npos ? say("%1% needs a value.", name)
                                                          : say("%1% can be given only once.", name);
     }
-    return text + '.';
+    return say("%1%.", text);
 }
 
 std::string CommandLine::describeExtra() const
@@ -274,6 +282,11 @@ std::string CommandLine::describeExtra() const
     {
         const std::string instead =
             command == nullptr ? "" : suggestInstead(command->get_name(), first);
+        const std::string place = describePlace(command, first);
+        if (!place.empty())
+        {
+            return place;
+        }
         return say("Unknown option '%1%'.", first) +
                (instead.empty() ? suggest(first, optionsOf(command == nullptr ? *line_ : *command))
                                 : instead);
@@ -281,6 +294,22 @@ std::string CommandLine::describeExtra() const
     const std::string word = showHidden(first);
     return command == nullptr ? say("Unknown command '%1%'.", word) + suggestCommand(word)
                               : say("Unexpected argument '%1%'.", word);
+}
+
+std::string CommandLine::describePlace(const CLI::App *command, const std::string &option) const
+{
+    if (command == nullptr)
+    {
+        return {};
+    }
+    const auto has = [&option](const CLI::App &line)
+    { return line.get_option_no_throw(option) != nullptr; };
+    if (has(*command))
+    {
+        return say("The option '%1%' must follow the command.", option);
+    }
+    return has(*line_) ? say("The option '%1%' must be before the command.", option)
+                       : std::string();
 }
 
 std::string CommandLine::describeMissing(const std::string &name) const

@@ -61,6 +61,8 @@ class CommandLine
     const CLI::App *parsedCommand() const;
     std::string describe(const CLI::ParseError &error) const;
     std::string describeExtra() const;
+    /// What to say of an option on the wrong side of the command; empty if it is unknown there too.
+    std::string describePlace(const CLI::App *command, const std::string &option) const;
     std::string describeMissing(const std::string &name) const;
     ExitStatus refuse(const std::string &reason) const;
 

@@ -12,6 +12,7 @@
 #include "mergeLeftovers.hpp"
 #include "namedPaths.hpp"
 #include "refusals.hpp"
+#include "renames.hpp"
 #include "runStoppable.hpp"
 #include "states.hpp"
 #include "texts.hpp"
@@ -89,8 +90,7 @@ class CommitCommand : public Command
     {
         CMAdapter &adapter = session.adapter();
         const upath &root = adapter.getRootFolder();
-        const FileStateMap states =
-            takesAll_ ? adapter.getFolderStates(root) : wholeStates(adapter);
+        const FileStateMap states = takesAll_ ? folderStates(adapter, root) : wholeStates(adapter);
         const std::string &message = message_->results().front();
         if (isBlank(message) && !mayBeSilent_)
         {

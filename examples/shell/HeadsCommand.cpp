@@ -18,18 +18,6 @@ namespace vclink::shell
 namespace
 {
 
-std::string hexadecimal(const git::GitRemoteHead::Id &id)
-{
-    constexpr const char *digits = "0123456789abcdef";
-    std::string text;
-    for (const unsigned char byte : id)
-    {
-        text += digits[byte >> 4U];
-        text += digits[byte & 0xFU];
-    }
-    return text;
-}
-
 class HeadsCommand : public Command
 {
   public:

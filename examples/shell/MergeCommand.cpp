@@ -13,8 +13,10 @@
 #include "commands.hpp"
 #include "failures.hpp"
 #include "mergeReport.hpp"
+#include "names.hpp"
 #include "revisions.hpp"
 #include "runStoppable.hpp"
+#include "suggestions.hpp"
 #include "texts.hpp"
 
 namespace vclink::shell
@@ -53,6 +55,12 @@ class MergeCommand : public Command
         const std::optional<std::string> before = findRevision(*manager, "HEAD");
         const std::optional<std::string> theirs = findRevision(*manager, name);
         const bool wasInOrder = isInOrder(*manager);
+        if (!theirs && wasInOrder)
+        {
+            throw ShellFailure(
+                say("Nothing was merged: there is no branch and no commit '%1%'.", showName(name)) +
+                suggestBranch(*manager, name));
+        }
         MergeNotes notes;
         const ExitStatus status = merge(session, *manager, name, notes);
         if (status == Done)

@@ -1,5 +1,7 @@
 // SPDX-License-Identifier: MIT
+#include <algorithm>
 #include <memory>
+#include <set>
 #include <string>
 #include <vector>
 
@@ -12,6 +14,7 @@
 #include "fl/i18n/convert.hpp"
 #include "names.hpp"
 #include "remotes.hpp"
+#include "revisions.hpp"
 #include "runWithRemote.hpp"
 #include "texts.hpp"
 
@@ -55,9 +58,13 @@ class PushCommand : public Command
                     refspecs.push_back(readPushRefspec(
                         *manager, text, branch, [&remote] { return remote->getRemoteHeads(); }));
                 }
-                push(*remote, refspecs);
+                dropWhatIsThere(*manager, *remote, name, refspecs);
+                if (isConfigured || !refspecs.empty())
+                {
+                    push(*remote, refspecs);
+                }
             });
-        return status == Done ? tell(notes, refspecs, name) : status;
+        return status == Done ? tell(notes, refspecs, name, isConfigured) : status;
     }
 
   private:
@@ -75,6 +82,36 @@ class PushCommand : public Command
         return {"refs/heads/" + branch};
     }
 
+    /// What the remote had when it was heard of last may be there still: only then it is asked.
+    static void dropWhatIsThere(const git::BranchManager &manager, const git::GitRemote &remote,
+                                const std::string &name, std::vector<PushRefspec> &refspecs)
+    {
+        const auto mayBeThere = [&](const PushRefspec &refspec)
+        {
+            const std::string tracking =
+                "refs/remotes/" + name + '/' + shortReference(refspec.target);
+            const auto id = findRevision(manager, tracking);
+            return !refspec.source.empty() && id && findRevision(manager, refspec.source) == id;
+        };
+        if (std::none_of(refspecs.begin(), refspecs.end(), mayBeThere))
+        {
+            return;
+        }
+        const std::vector<git::GitRemoteHead> heads = remote.getRemoteHeads();
+        const auto isThere = [&](const PushRefspec &refspec)
+        {
+            return mayBeThere(refspec) &&
+                   std::any_of(heads.begin(), heads.end(),
+                               [&](const git::GitRemoteHead &head)
+                               {
+                                   return head.name == refspec.target &&
+                                          hexadecimal(head.oid) ==
+                                              findRevision(manager, refspec.source);
+                               });
+        };
+        refspecs.erase(std::remove_if(refspecs.begin(), refspecs.end(), isThere), refspecs.end());
+    }
+
     static void push(git::GitRemote &remote, const std::vector<PushRefspec> &refspecs)
     {
         std::vector<std::string> texts;
@@ -87,15 +124,24 @@ class PushCommand : public Command
 
     /// The back end counts a push as done whatever the server made of it.
     static ExitStatus tell(const RemoteNotes &notes, const std::vector<PushRefspec> &refspecs,
-                           const std::string &remote)
+                           const std::string &remote, bool isConfigured)
     {
         std::string rejected;
+        std::set<std::string> names;
         for (const PushedReference &reference : notes.pushed)
         {
             if (!reference.rejection.empty())
             {
+                names.insert(reference.name);
                 rejected += "\n  " + reference.name + ": " +
                             makePrintableLine(fl::i18n::utf8_to_ustring(reference.rejection));
+            }
+        }
+        for (const PushRefspec &refspec : refspecs)
+        {
+            if (names.count(refspec.target) == 0)
+            {
+                (rejected.empty() ? remark : inform)(refspec.describe(remote));
             }
         }
         if (!rejected.empty())
@@ -104,13 +150,10 @@ class PushCommand : public Command
             complain(say("%1% rejected:%2%", remote, rejected));
             return Failed;
         }
-        for (const PushRefspec &refspec : refspecs)
-        {
-            remark(refspec.describe(remote));
-        }
         if (refspecs.empty())
         {
-            remark(say("Pushed to %1%, as remote.%1%.push says.", remote));
+            remark(isConfigured ? say("Pushed to %1%, as remote.%1%.push says.", remote)
+                                : say("Everything is up to date at %1%.", remote));
         }
         return Done;
     }

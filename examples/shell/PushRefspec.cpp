@@ -5,7 +5,9 @@
 #include <string_view>
 
 #include "failures.hpp"
+#include "names.hpp"
 #include "revisions.hpp"
+#include "suggestions.hpp"
 #include "texts.hpp"
 
 namespace vclink::shell
@@ -124,10 +126,12 @@ PushRefspec readPushRefspec(const git::BranchManager &manager, const std::string
     const std::string text = refspec.substr(result.mayLoseCommits ? 1 : 0);
     const std::size_t colon = text.find(':');
     result.source = completeSource(manager, text.substr(0, colon), currentBranch);
-    if (colon == std::string::npos && !begins(result.source, "refs/"))
+    const bool isDetachedHead = result.source == "HEAD" && colon != std::string::npos;
+    if (!result.source.empty() && !begins(result.source, "refs/") && !isDetachedHead)
     {
-        throw ShellFailure(
-            say("Nothing was pushed: there is no branch and no tag '%1%' here.", text));
+        throw ShellFailure(say("Nothing was pushed: there is no branch and no tag '%1%' here.",
+                               showName(text.substr(0, colon))) +
+                           suggestBranch(manager, text.substr(0, colon)));
     }
     result.target = colon == std::string::npos
                         ? result.source

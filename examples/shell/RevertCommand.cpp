@@ -18,6 +18,7 @@
 #include "runStoppable.hpp"
 #include "states.hpp"
 #include "texts.hpp"
+#include "vclink/PollableTerminator.hpp"
 #include "vclink/util/exception/CancelledOperationException.hpp"
 
 namespace vclink::shell
@@ -45,14 +46,20 @@ class RevertCommand : public Command
     {
         CMAdapter &adapter = session.adapter();
         const upath &root = adapter.getRootFolder();
-        const std::vector<NamedPath> paths = lookUp(adapter, paths_->results());
+        std::vector<NamedPath> paths = lookUp(adapter, paths_->results());
+        addOverlooked(adapter, paths);
         refuseUnless(say("Nothing was reverted"), paths,
                      [&root](const NamedPath &named) { return explainUntracked(root, named); });
         const Cover reverted = cover(root, paths, isChanged, LinkNames::Patterns);
         refuseStrays(say("Nothing was reverted"), adapter, paths, reverted.list, isChanged);
-        const WayBack wayBack = forgets_ ? WayBack() : keepContents(adapter, reverted.files);
-        const ExitStatus status = runStoppable(session, Stops::BeforeWriting,
-                                               [&] { revert(session, reverted.list, wayBack); });
+        const ExitStatus status =
+            runStoppable(session, Stops::BeforeWriting,
+                         [&]
+                         {
+                             const WayBack wayBack =
+                                 forgets_ ? WayBack() : keep(session, paths, reverted);
+                             revert(session, reverted.list, wayBack);
+                         });
         if (status != Done)
         {
             return status;
@@ -71,6 +78,19 @@ class RevertCommand : public Command
         {
             inform(wayBack);
         }
+    }
+
+    /// @throws CancelledOperationException if the person has asked to stop meanwhile
+    static WayBack keep(Session &session, const std::vector<NamedPath> &paths,
+                        const Cover &reverted)
+    {
+        PollableTerminator terminator(session.interactor()->getTerminator());
+        WayBack wayBack = keepContents(session, paths, reverted.files);
+        if (terminator.checkAndResetCancelledState())
+        {
+            throw util::exception::CancelledOperationException();
+        }
+        return wayBack;
     }
 
     /// Says how to restore what is discarded, once that may have been.

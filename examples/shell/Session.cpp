@@ -4,6 +4,7 @@
 #include <filesystem>
 #include <string>
 #include <system_error>
+#include <utility>
 
 #include "failures.hpp"
 #include "fl/i18n/convert.hpp"
@@ -112,8 +113,10 @@ upath findRoot(const CMAdapterFactory &factory, bool takesAnyBare,
 
 } // namespace
 
-Session::Session(Output &output, ProgressLine &progressLine, bool takesAnyBare)
+Session::Session(Output &output, ProgressLine &progressLine, bool takesAnyBare,
+                 std::filesystem::path startFolder)
     : output_(output), progressLine_(progressLine), takesAnyBare_(takesAnyBare),
+      startFolder_(std::move(startFolder)),
       interactor_(std::make_shared<ShellInteractor>(progressLine))
 {
 }
@@ -154,6 +157,11 @@ CMAdapter &Session::adapter()
         guard_.emplace();
     }
     return *adapter_;
+}
+
+const std::filesystem::path &Session::startFolder() const noexcept
+{
+    return startFolder_;
 }
 
 void Session::endBySignal(int signal) noexcept

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include <filesystem>
 #include <memory>
 #include <optional>
 
@@ -23,7 +24,9 @@ class Session
   public:
     /// @param output, progressLine must outlive the session
     /// @param takesAnyBare whether to work in a bare repository inside a working copy, too
-    Session(Output &output, ProgressLine &progressLine, bool takesAnyBare = false);
+    /// @param startFolder where the person is: absolute, free of symbolic links
+    Session(Output &output, ProgressLine &progressLine, bool takesAnyBare = false,
+            std::filesystem::path startFolder = {});
     Session(const Session &) = delete;
     Session &operator=(const Session &) = delete;
     ~Session();
@@ -38,6 +41,9 @@ class Session
     ///         working copy, and what the back end throws
     CMAdapter &adapter();
 
+    /// Where the program was started, before -C.
+    const std::filesystem::path &startFolder() const noexcept;
+
     /// Notes that the program is to end as by this signal, whatever the command's own status is.
     void endBySignal(int signal) noexcept;
     /// The signal that the program is to end as by.
@@ -47,6 +53,7 @@ class Session
     Output &output_;
     ProgressLine &progressLine_;
     bool takesAnyBare_;
+    std::filesystem::path startFolder_;
     std::optional<int> endingSignal_;
     git::GitAdapterFactory factory_;
     std::shared_ptr<ShellInteractor> interactor_;

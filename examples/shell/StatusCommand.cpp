@@ -10,6 +10,7 @@
 #include "namedPaths.hpp"
 #include "names.hpp"
 #include "refusals.hpp"
+#include "renames.hpp"
 #include "states.hpp"
 #include "texts.hpp"
 #include "workingCopy.hpp"
@@ -91,7 +92,7 @@ class StatusCommand : public Command
     {
         CMAdapter &adapter = session.adapter();
         const upath &root = adapter.getRootFolder();
-        const FileStateMap states = paths_->empty() ? adapter.getFolderStates(root)
+        const FileStateMap states = paths_->empty() ? folderStates(adapter, root)
                                                     : collectStates(adapter, paths_->results());
         if (states.empty())
         {

@@ -5,13 +5,19 @@
 #include <CLI/CLI.hpp>
 
 #include "Output.hpp"
+#include "ProgressLine.hpp"
 #include "Session.hpp"
 #include "arguments.hpp"
 #include "commands.hpp"
 #include "failures.hpp"
+#include "mergeReport.hpp"
+#include "names.hpp"
 #include "revisions.hpp"
 #include "runStoppable.hpp"
+#include "suggestions.hpp"
+#include "switchReport.hpp"
 #include "texts.hpp"
+#include "vclink/git/LibGit2Exception.hpp"
 
 namespace vclink::shell
 {
@@ -50,9 +56,16 @@ class SwitchCommand : public Command
     {
         const auto manager = git::BranchManager::create(session.adapter());
         const std::string name = name_->results().front();
+        if (!isBranch(*manager, name))
+        {
+            const bool isCommit = findRevision(*manager, name + "^{commit}").has_value();
+            throw ShellFailure(
+                say("There is no branch '%1%'.", showName(name)) +
+                (isCommit ? ' ' + say("Use \"%1%\".", "git switch --detach " + showName(name))
+                          : suggestBranch(*manager, name)));
+        }
         refuseOtherFiles(*manager, name);
-        const ExitStatus status = runStoppable(session, Stops::BeforeWriting,
-                                               [&manager, &name] { manager->switchBranch(name); });
+        const ExitStatus status = switchTo(session, *manager, name);
         if (status == Done)
         {
             remark(say("The current branch is %1%.", name));
@@ -61,6 +74,28 @@ class SwitchCommand : public Command
     }
 
   private:
+    static ExitStatus switchTo(Session &session, git::BranchManager &manager,
+                               const std::string &name)
+    {
+        constexpr int isConflict = -13; // GIT_ECONFLICT
+        try
+        {
+            return runStoppable(session, Stops::BeforeWriting,
+                                [&manager, &name] { manager.switchBranch(name); });
+        }
+        catch (const git::LibGit2Exception &failure)
+        {
+            if (failure.getError().getCode() != isConflict)
+            {
+                throw;
+            }
+            session.progressLine().clear();
+            const ExitStatus status = reportFailure();
+            tellSwitchObstacles(session.adapter(), manager, name);
+            return status;
+        }
+    }
+
     const CLI::Option *name_ = nullptr;
 };
 

@@ -264,8 +264,9 @@ constexpr Translation commandHelpRows[] = {
     {"in a conflict that is not resolved yet", "in einem Konflikt, der noch nicht gelöst ist",
      "競合していて、まだ解決されていない"},
     {"not tracked", "Git nicht bekannt", "追跡されていない"},
-    {"anything else, e.g. renamed and staged", "alles andere, z. B. umbenannt und vorgemerkt",
-     "それ以外 (名前の変更をステージした場合など)"},
+    {"anything else, e.g. replaced by a symbolic link",
+     "alles andere, z. B. durch einen symbolischen Link ersetzt",
+     "それ以外 (シンボリックリンクに置き換えた場合など)"},
 };
 
 } // namespace

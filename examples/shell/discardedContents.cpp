@@ -1,19 +1,24 @@
 // SPDX-License-Identifier: MIT
 #include "discardedContents.hpp"
 
+#include <algorithm>
+#include <cerrno>
 #include <cstddef>
-#include <cstdlib>
 #include <filesystem>
+#include <iterator>
+#include <map>
 #include <set>
-#include <string_view>
 #include <system_error>
 
+#include <fcntl.h>
 #include <unistd.h>
 
+#include "Session.hpp"
 #include "failures.hpp"
 #include "fl/i18n/convert.hpp"
-#include "gitProgram.hpp"
+#include "indexEntries.hpp"
 #include "names.hpp"
+#include "storedObjects.hpp"
 #include "texts.hpp"
 #include "workingCopy.hpp"
 
@@ -24,207 +29,298 @@ namespace
 
 namespace fs = std::filesystem;
 
-/// An index of its own, in a folder that goes away with it.
-class ScratchIndex
+/// What a revert overwrites or deletes on the disk.
+struct OnDisk
 {
-  public:
-    explicit ScratchIndex(fs::path root) : root_(std::move(root))
-    {
-        std::error_code ignored;
-        std::string folder = (fs::temp_directory_path(ignored) / "vclink-shell-XXXXXX").string();
-        if (::mkdtemp(folder.data()) != nullptr)
-        {
-            folder_ = folder;
-        }
-    }
-    ScratchIndex(const ScratchIndex &) = delete;
-    ScratchIndex &operator=(const ScratchIndex &) = delete;
-    ~ScratchIndex()
-    {
-        std::error_code ignored;
-        fs::remove_all(folder_, ignored);
-    }
-
-    /// @throws ShellFailure
-    std::string git(std::vector<std::string> arguments, const std::string &input = {}) const
-    {
-        const std::string variable = "GIT_INDEX_FILE=" + (folder_ / "index").string();
-        const auto output =
-            folder_.empty() ? std::nullopt : runGit(root_, std::move(arguments), input, {variable});
-        if (!output)
-        {
-            throw ShellFailure(say("Nothing was reverted: git can't store what would be discarded. "
-                                   "To discard it for good, use --forget."));
-        }
-        return *output;
-    }
-    /// The id of what the index holds.
-    std::string writeTree() const
-    {
-        const std::string id = git({"write-tree"});
-        return id.substr(0, id.find('\n'));
-    }
-
-  private:
-    fs::path root_;
-    fs::path folder_;
+    /// files, links, and folders that are in the place of a file, each relative to the root
+    std::set<std::string> names;
+    /// whether a folder comes back in the place of a file
+    bool becomesFolder = false;
+    /// what there can be no copy of, and why
+    std::map<std::string, std::string> obstacles;
 };
 
-using Names = std::set<std::string>;
-
-/// What is staged for these files and not in HEAD, as "git update-index --index-info" takes it.
-std::string findStaged(const fs::path &root, const Names &names)
+void collectFile(const fs::path &root, const fs::path &name, OnDisk &found)
 {
-    if (names.empty())
+    const fs::path path = root / name;
+    std::error_code error;
+    const fs::file_status status = fs::symlink_status(path, error);
+    if (fs::is_regular_file(status) && ::faccessat(AT_FDCWD, path.c_str(), R_OK, AT_EACCESS) != 0)
     {
-        return {};
+        found.obstacles.emplace(name.string(), std::generic_category().message(errno));
     }
-    // ":MODE MODE ID ID STATUS", the name, each with a NUL at its end.
-    const std::string text =
-        runGit(root, {"diff-index", "--cached", "--raw", "-z", "--no-renames", "HEAD"})
-            .value_or("");
-    std::string entries;
-    for (std::size_t start = 0; start < text.size();)
+    else if (fs::is_regular_file(status) || fs::is_symlink(status))
     {
-        const std::size_t middle = text.find('\0', start);
-        const std::size_t end = text.find('\0', middle + 1);
-        if (middle == std::string::npos || end == std::string::npos)
-        {
-            break;
-        }
-        const std::string record = text.substr(start, middle - start);
-        const std::string name = text.substr(middle + 1, end - middle - 1);
-        const std::string mode = record.substr(8, 6);
-        const std::size_t id = record.find(' ', 15) + 1;
-        if (names.count(name) != 0 && mode != "000000")
-        {
-            entries +=
-                mode + ' ' + record.substr(id, record.find(' ', id) - id) + '\t' + name + '\0';
-        }
-        start = end + 1;
+        found.names.insert(name.string());
     }
-    return entries;
 }
 
-bool isFile(const fs::path &path)
+/// A folder that is in the place of a file.
+void collectFolder(const fs::path &root, const std::string &name, OnDisk &found)
 {
-    std::error_code ignored;
-    const fs::file_status status = fs::symlink_status(path, ignored);
-    return fs::is_regular_file(status) || fs::is_symlink(status);
+    std::error_code error;
+    const std::size_t before = found.names.size();
+    for (fs::recursive_directory_iterator entry(root / name, error), end; !error && entry != end;
+         entry.increment(error))
+    {
+        if (entry->path().filename() == ".git")
+        {
+            found.obstacles.emplace(name, say("a repository is in its place"));
+            return;
+        }
+        collectFile(root, entry->path().lexically_relative(root), found);
+    }
+    if (error)
+    {
+        found.obstacles.emplace(name, error.message());
+    }
+    if (found.names.size() != before)
+    {
+        found.names.insert(name);
+    }
 }
 
 /// Adds what is in the place of a file: the file, a file or link where it has a folder, or all
-/// files of a folder that has its name. The folder of a submodule stays.
-void collectInPlace(const fs::path &root, const std::string &name, Names &found)
+/// files of a folder that has its name.
+void collectInPlace(const fs::path &root, const std::string &name, OnDisk &found)
 {
     fs::path place;
     for (const fs::path &element : fs::path(name))
     {
         place /= element;
-        if (isFile(root / place))
+        std::error_code error;
+        const fs::file_status status = fs::symlink_status(root / place, error);
+        if (fs::status_known(status) && !fs::is_directory(status))
         {
-            found.insert(place.string());
+            found.becomesFolder = found.becomesFolder || (fs::exists(status) && place != name);
+            collectFile(root, place, found);
+            return;
+        }
+        if (!fs::status_known(status))
+        {
+            found.obstacles.emplace(name, error.message());
             return;
         }
     }
-    std::error_code error;
-    const fs::path folder = root / name;
-    if (!fs::is_directory(folder, error) || hasGitEntry(folder))
-    {
-        return;
-    }
-    for (fs::recursive_directory_iterator entry(folder, error), end; !error && entry != end;
-         entry.increment(error))
-    {
-        if (isFile(entry->path()))
-        {
-            found.insert(entry->path().lexically_relative(root).string());
-        }
-    }
+    collectFolder(root, name, found);
 }
 
-std::string join(const Names &names)
+/// What the index holds of what is reverted.
+class Index
 {
-    std::string text;
+  public:
+    /// @throws StoreFailure
+    Index(const upath &root, const std::vector<NamedPath> &paths) : root_(nativePath(root))
+    {
+        for (const NamedPath &named : paths)
+        {
+            if (liesIn(named.path.string(), root.string()))
+            {
+                reverted_.push_back(fl::i18n::ustring_to_utf8(relativeName(named.path, root)));
+            }
+        }
+        auto changes = readStagedChanges(root_);
+        auto entries = readIndex(root_);
+        if (!changes || !entries)
+        {
+            throw StoreFailure(say("git can't read the index, or is not installed"));
+        }
+        std::copy_if(changes->begin(), changes->end(), std::back_inserter(changes_),
+                     [this](const StagedChange &change) { return isReverted(change.name); });
+        entries_ = std::move(*entries);
+        findSubmodules();
+    }
+
+    const std::vector<StagedChange> &changes() const noexcept
+    {
+        return changes_;
+    }
+    /// Of HEAD, where HEAD and the index differ. Its folder stays as it is.
+    bool isSubmodule(const std::string &name) const
+    {
+        return submodules_.count(name) != 0;
+    }
+    /// Changed files that have no changed state, whatever they hold.
+    std::vector<StagedChange> overlookedChanges() const
+    {
+        std::vector<StagedChange> files;
+        for (const IndexEntry &entry : entries_)
+        {
+            if (entry.isOverlooked && isReverted(entry.name) && !isSubmodule(entry.name))
+            {
+                files.push_back({entry.name, entry.mode, entry.mode, entry.id});
+            }
+        }
+        return selectOthersThanOnDisk(root_, files, Filters::Ignored);
+    }
+
+  private:
+    bool isReverted(const std::string &name) const
+    {
+        return std::any_of(reverted_.begin(), reverted_.end(),
+                           [&name](const std::string &path) {
+                               return path.empty() || name == path ||
+                                      name.compare(0, path.size() + 1, path + '/') == 0;
+                           });
+    }
+    void findSubmodules()
+    {
+        for (const IndexEntry &entry : entries_)
+        {
+            if (entry.mode == submoduleMode)
+            {
+                submodules_.insert(entry.name);
+            }
+        }
+        for (const StagedChange &change : changes_)
+        {
+            submodules_.erase(change.name);
+            if (change.modeInHead == submoduleMode)
+            {
+                submodules_.insert(change.name);
+            }
+        }
+    }
+
+    fs::path root_;
+    std::vector<std::string> reverted_;
+    std::vector<StagedChange> changes_;
+    std::vector<IndexEntry> entries_;
+    std::set<std::string> submodules_;
+};
+
+OnDisk collect(const fs::path &root, const std::set<std::string> &names, const Index &index)
+{
+    OnDisk found;
     for (const std::string &name : names)
     {
-        text += name + '\0';
-    }
-    return text;
-}
-
-/// Whether an index still holds these entries.
-bool holds(const ScratchIndex &index, const std::string &entries)
-{
-    // "MODE ID STAGE", a tab, and the name.
-    std::string all = index.git({"ls-files", "--stage", "-z"});
-    for (std::size_t place = all.find(" 0\t"); place != std::string::npos;
-         place = all.find(" 0\t", place))
-    {
-        all.erase(place, 2);
-    }
-    all.insert(0, 1, '\0');
-    for (std::size_t start = 0; start < entries.size();)
-    {
-        const std::size_t end = entries.find('\0', start) + 1;
-        if (all.find('\0' + entries.substr(start, end - start)) == std::string::npos)
+        std::error_code ignored;
+        if (!index.isSubmodule(name) || !fs::is_directory(root / name, ignored))
         {
-            return false;
+            collectInPlace(root, name, found);
         }
-        start = end;
     }
-    return true;
+    return found;
 }
 
-std::string describe(const std::string &sentence, const std::string &option,
-                     const std::string &tree)
+/// What is on the disk under the names that HEAD has: what was only added stays there.
+std::set<std::string> namesInHead(const Index &index, const upath &root,
+                                  const FileStateMap &changed)
 {
-    return fill(sentence,
-                {"git restore --overlay " + option + "--source=" + tree.substr(0, 12) + " :/"});
+    std::set<std::string> names;
+    for (const auto &[path, state] : changed)
+    {
+        names.insert(fl::i18n::ustring_to_utf8(relativeName(path, root)));
+    }
+    for (const StagedChange &change : index.changes())
+    {
+        names.insert(change.name);
+        if (change.isAdded())
+        {
+            names.erase(change.name);
+        }
+    }
+    return names;
+}
+
+/// @throws ShellFailure that names each
+void refuseObstacles(const fs::path &root, const std::map<std::string, std::string> &obstacles)
+{
+    std::string text;
+    for (const auto &[name, reason] : obstacles)
+    {
+        text += "\n  " + showPath(makePath(root / name)) + ": " + reason;
+    }
+    if (!text.empty())
+    {
+        throw ShellFailure(say("Nothing was reverted, as no copy can be kept of what would be "
+                               "discarded:%1%\nMove it out of the way, or discard it for good with "
+                               "--forget.",
+                               text));
+    }
+}
+
+/// "" for the folder that the person is in, otherwise "-C FOLDER ".
+std::string optionForFolder(const fs::path &root, const fs::path &start)
+{
+    const upath folder = makePath(start);
+    const bool isInside = liesIn(folder.string(), makePath(root).string());
+    const fs::path way =
+        isInside ? nativePath(upath(wayTo(makePath(root), folder.string()))) : root;
+    return way == "." ? std::string() : "-C " + quoteForShell(way.string()) + ' ';
+}
+
+std::string shorten(const std::string &id)
+{
+    return id.substr(0, 12);
+}
+
+WayBack keep(Session &session, const std::vector<NamedPath> &paths, const FileStateMap &changed)
+{
+    const upath &rootPath = session.adapter().getRootFolder();
+    const fs::path root = nativePath(rootPath);
+    const Index index(rootPath, paths);
+    const OnDisk onDisk = collect(root, namesInHead(index, rootPath, changed), index);
+    refuseObstacles(root, onDisk.obstacles);
+    const std::string folder = optionForFolder(root, session.startFolder());
+    WayBack wayBack;
+    if (!onDisk.names.empty())
+    {
+        const std::string archive = storeArchive(root, {onDisk.names.begin(), onDisk.names.end()});
+        wayBack.files = say(
+            "To restore what was discarded: %1%",
+            fill("git %1%cat-file blob %2% | tar %1%%3%-xp",
+                 {folder, shorten(archive), onDisk.becomesFolder ? "--recursive-unlink " : ""}));
+    }
+    std::vector<StagedChange> staged = index.changes();
+    staged.erase(std::remove_if(staged.begin(), staged.end(),
+                                [](const StagedChange &change) { return change.isDeleted(); }),
+                 staged.end());
+    if (!selectOthersThanOnDisk(root, staged, Filters::Applied).empty())
+    {
+        wayBack.staged = say("To restore what was staged: %1%",
+                             fill("git %1%restore --overlay --staged --source=%2% :/",
+                                  {folder, shorten(storeTree(root, staged))}));
+    }
+    return wayBack;
 }
 
 } // namespace
 
-WayBack keepContents(CMAdapter &adapter, const FileStateMap &files)
+void addOverlooked(CMAdapter &adapter, std::vector<NamedPath> &paths)
+try
 {
-    const fs::path root = nativePath(adapter.getRootFolder());
-    Names added;
-    Names others;
-    Names addedOnDisk;
-    Names othersOnDisk;
-    for (const auto &[path, state] : files)
+    const upath &root = adapter.getRootFolder();
+    for (const StagedChange &change : Index(root, paths).overlookedChanges())
     {
-        const std::string name =
-            fl::i18n::ustring_to_utf8(relativeName(path, adapter.getRootFolder()));
-        // What was only added stays on the disk.
-        const bool isAdded = state.getState() == FileState::Added;
-        (isAdded ? added : others).insert(name);
-        collectInPlace(root, name, isAdded ? addedOnDisk : othersOnDisk);
+        const upath path = makePath(nativePath(root) / change.name);
+        for (NamedPath &named : paths)
+        {
+            if (liesIn(path.string(), named.path.string()))
+            {
+                named.states.insert_or_assign(path, FileState(FileState::Modified));
+            }
+        }
     }
-    const std::string stagedOfAdded = findStaged(root, added);
-    const std::string stagedOfOthers = findStaged(root, others);
-    const std::string staged = stagedOfAdded + stagedOfOthers;
-    const bool isDiscarded = !stagedOfOthers.empty() || !othersOnDisk.empty();
-    if (staged.empty() && !isDiscarded)
+}
+catch (const StoreFailure &)
+{
+    // Then nothing can be kept either, which is told.
+}
+
+WayBack keepContents(Session &session, const std::vector<NamedPath> &paths,
+                     const FileStateMap &changed)
+{
+    try
     {
-        return {};
+        return keep(session, paths, changed);
     }
-    const ScratchIndex index(root);
-    index.git({"read-tree", "--empty"});
-    index.git({"update-index", "-z", "--index-info"}, staged);
-    const std::string stagedTree = index.writeTree();
-    index.git({"update-index", "-z", "--add", "--replace", "--stdin"},
-              join(addedOnDisk) + join(othersOnDisk));
-    WayBack wayBack;
-    if (isDiscarded)
+    catch (const StoreFailure &failure)
     {
-        wayBack.files = describe(say("To restore what was discarded: %1%"), "", index.writeTree());
+        throw ShellFailure(say("Nothing was reverted, as what would be discarded can't be stored: "
+                               "%1%.\nTo discard it for good, use --forget.",
+                               failure.what()));
     }
-    if (!staged.empty() && !holds(index, staged))
-    {
-        wayBack.staged = describe(say("To restore what was staged: %1%"), "--staged ", stagedTree);
-    }
-    return wayBack;
 }
 
 } // namespace vclink::shell

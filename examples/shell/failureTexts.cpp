@@ -22,6 +22,54 @@ constexpr Translation failureRows[] = {
      "Das Repository gehört %1%. Wenn Sie ihm vertrauen: git config --global --add safe.directory "
      "%2%",
      "リポジトリの所有者は %1% です。信頼できる場合: git config --global --add safe.directory %2%"},
+    {"Get the remote's commits with \"vclink-shell fetch\", merge them, and push again. To lose "
+     "them "
+     "there,\nput a plus before the branch: \"vclink-shell push REMOTE +BRANCH\".",
+     "Holen Sie die Commits von dort mit \"vclink-shell fetch\", führen Sie sie zusammen, und "
+     "pushen "
+     "Sie noch\neinmal. Um sie dort zu verlieren, setzen Sie ein Plus vor den Branch: "
+     "\"vclink-shell push REMOTE +BRANCH\".",
+     "\"vclink-shell fetch\" "
+     "でリモートのコミットを取得し、マージしてからもう一度プッシュしてください。リモートの\nコミッ"
+     "ト"
+     "を失ってよい場合は、ブランチの前に + を付けてください: \"vclink-shell push REMOTE "
+     "+BRANCH\"。"},
+    {"%1% has the format, in core.repositoryformatversion and extensions. If git can work "
+     "here,\nuse "
+     "git.",
+     "Das Format steht in %1%, unter core.repositoryformatversion und extensions. Wenn git hier "
+     "arbeiten kann,\nbenutzen Sie git.",
+     "形式は %1% の core.repositoryformatversion と extensions にあります。git "
+     "が使える場合は、git を使ってください。"},
+    {"%1%.", "%1%.", "%1%。"},
+    {"There is no remote '%1%'.", "Es gibt kein Remote '%1%'.", "リモート '%1%' はありません。"},
+    {"Add one with \"git remote add %1% ADDRESS\".",
+     "Fügen Sie eines hinzu: \"git remote add %1% ADRESSE\".",
+     "\"git remote add %1% ADDRESS\" で追加してください。"},
+    {"There is no commit yet that a branch could begin at.",
+     "Es gibt noch keinen Commit, an dem ein Branch beginnen könnte.",
+     "ブランチの起点になるコミットがまだありません。"},
+    {"There is no current branch: HEAD is at a commit, not at a branch.",
+     "Es gibt keinen aktuellen Branch: HEAD steht auf einem Commit, nicht auf einem Branch.",
+     "現在のブランチはありません。HEAD はブランチではなくコミットを指しています。"},
+    {"There is no current branch: nothing was committed yet.",
+     "Es gibt keinen aktuellen Branch: Noch wurde nichts committet.",
+     "現在のブランチはありません。まだ何もコミットされていません。"},
+    {"There is no branch '%1%'.", "Es gibt keinen Branch '%1%'.", "ブランチ '%1%' はありません。"},
+    {"There is no branch and no commit '%1%'.", "Es gibt keinen Branch und keinen Commit '%1%'.",
+     "ブランチもコミットも '%1%' という名前ではありません。"},
+    {"Nothing was merged: there is no branch and no commit '%1%'.",
+     "Nichts wurde zusammengeführt: Es gibt keinen Branch und keinen Commit '%1%'.",
+     "何もマージされませんでした。ブランチもコミットも '%1%' という名前ではありません。"},
+    {"Make it from %1% with \"vclink-shell branch %2% %1%\".",
+     "Machen Sie ihn aus %1%: \"vclink-shell branch %2% %1%\".",
+     "%1% から作るには \"vclink-shell branch %2% %1%\" を使ってください。"},
+    {"Nothing was fetched: %1% has no reference '%2%'.",
+     "Nichts wurde geholt: %1% hat keine Referenz '%2%'.",
+     "何も取得されませんでした。%1% に参照 '%2%' はありません。"},
+    {"Nothing was cloned: %1% can't be found: %2%.",
+     "Nichts wurde geklont: %1% ist nicht zu finden: %2%.",
+     "何もクローンされませんでした。%1% が見つかりません: %2%。"},
     {"%1% second", "%1% Sekunde", "%1% 秒"},
     {"%1% seconds", "%1% Sekunden", "%1% 秒"},
     {"%1% minute", "%1% Minute", "%1% 分"},

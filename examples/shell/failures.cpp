@@ -1,7 +1,9 @@
 // SPDX-License-Identifier: MIT
 #include "failures.hpp"
 
+#include <algorithm>
 #include <csignal>
+#include <cstddef>
 #include <exception>
 #include <iostream>
 
@@ -34,6 +36,22 @@ std::string indent(std::string text)
         text.insert(place + 1, "    ");
     }
     return text;
+}
+
+/// A list of files in a text of the back end, as the program lists them: one on each line.
+std::string showPaths(const ustring &text)
+{
+    std::string shown;
+    for (std::size_t start = 0; start <= text.size();)
+    {
+        const std::size_t end = std::min(text.find(u'\n', start), text.size());
+        const ustring line = text.substr(start, end - start);
+        const bool isPath = start != 0 && !line.empty() && line.front() == u'/';
+        shown += start == 0 ? "" : "\n";
+        shown += isPath ? "  " + showPath(upath(line)) : fl::i18n::ustring_to_utf8(line);
+        start = end + 1;
+    }
+    return shown;
 }
 
 } // namespace
@@ -80,7 +98,7 @@ ExitStatus reportFailure()
     }
     catch (const foundation::core::except::IUserException &failure)
     {
-        complain(fl::i18n::ustring_to_utf8(failure.GetUnicodeMessageTxt()));
+        complain(showPaths(failure.GetUnicodeMessageTxt()));
     }
     catch (const ShellFailure &failure)
     {

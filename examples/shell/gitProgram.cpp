@@ -1,12 +1,12 @@
 // SPDX-License-Identifier: MIT
 #include "gitProgram.hpp"
 
+#include <array>
 #include <cerrno>
+#include <system_error>
 #include <utility>
 
-#include <fcntl.h>
 #include <spawn.h>
-#include <sys/mman.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
@@ -14,65 +14,6 @@ namespace vclink::shell
 {
 namespace
 {
-
-/// A file in memory, for what a program reads or writes.
-class Memory
-{
-  public:
-    explicit Memory(std::string_view bytes = {}) : number_(::memfd_create("git", MFD_CLOEXEC))
-    {
-        while (!bytes.empty() && number_ >= 0)
-        {
-            const ssize_t written = ::write(number_, bytes.data(), bytes.size());
-            if (written < 0 && errno != EINTR)
-            {
-                isComplete_ = false;
-                return;
-            }
-            bytes.remove_prefix(written < 0 ? 0 : static_cast<std::size_t>(written));
-        }
-        isComplete_ = number_ >= 0 && ::lseek(number_, 0, SEEK_SET) == 0;
-    }
-    Memory(const Memory &) = delete;
-    Memory &operator=(const Memory &) = delete;
-    ~Memory()
-    {
-        if (number_ >= 0)
-        {
-            ::close(number_);
-        }
-    }
-    int number() const noexcept
-    {
-        return number_;
-    }
-    bool isComplete() const noexcept
-    {
-        return isComplete_;
-    }
-    std::string read() const
-    {
-        const off_t size = ::lseek(number_, 0, SEEK_END);
-        std::string bytes(size < 0 ? 0 : static_cast<std::size_t>(size), '\0');
-        std::size_t done = 0;
-        while (done < bytes.size())
-        {
-            const ssize_t count = ::pread(number_, bytes.data() + done, bytes.size() - done,
-                                          static_cast<off_t>(done));
-            if (count <= 0)
-            {
-                break;
-            }
-            done += static_cast<std::size_t>(count);
-        }
-        bytes.resize(done);
-        return bytes;
-    }
-
-  private:
-    int number_;
-    bool isComplete_ = false;
-};
 
 std::vector<char *> pointersTo(std::vector<std::string> &texts)
 {
@@ -86,14 +27,15 @@ std::vector<char *> pointersTo(std::vector<std::string> &texts)
     return pointers;
 }
 
-/// Without git's own variables, which the library does not read.
-std::vector<std::string> environmentOfGit(const std::vector<std::string> &added)
+/// Without git's own variables, which the library does not read, and the options of tar.
+std::vector<std::string> environmentOfPrograms()
 {
-    std::vector<std::string> variables = added;
+    std::vector<std::string> variables;
     for (char **variable = ::environ; *variable != nullptr; ++variable)
     {
         const std::string_view text = *variable;
-        if (text.substr(0, 4) != "GIT_" || text.substr(0, 11) == "GIT_CONFIG_")
+        const bool isOfGit = text.substr(0, 4) == "GIT_" && text.substr(0, 11) != "GIT_CONFIG_";
+        if (!isOfGit && text.substr(0, 12) != "TAR_OPTIONS=")
         {
             variables.emplace_back(text);
         }
@@ -101,49 +43,79 @@ std::vector<std::string> environmentOfGit(const std::vector<std::string> &added)
     return variables;
 }
 
-/// @return whether the program has ended with status 0
-bool run(std::vector<std::string> words, std::vector<std::string> variables, const Memory &in,
-         const Memory &out)
+/// @return 0 or the system's error
+int spawn(pid_t &child, std::vector<std::string> words, const std::array<int, 3> &descriptors)
 {
     posix_spawn_file_actions_t actions;
     ::posix_spawn_file_actions_init(&actions);
-    ::posix_spawn_file_actions_adddup2(&actions, in.number(), STDIN_FILENO);
-    ::posix_spawn_file_actions_adddup2(&actions, out.number(), STDOUT_FILENO);
-    ::posix_spawn_file_actions_addopen(&actions, STDERR_FILENO, "/dev/null", O_WRONLY, 0);
-    pid_t child = 0;
-    const int error = ::posix_spawnp(&child, "git", &actions, nullptr, pointersTo(words).data(),
-                                     pointersTo(variables).data());
-    ::posix_spawn_file_actions_destroy(&actions);
-    if (error != 0)
+    for (std::size_t index = 0; index < descriptors.size(); ++index)
     {
-        return false;
+        ::posix_spawn_file_actions_adddup2(&actions, descriptors[index], static_cast<int>(index));
+    }
+    posix_spawnattr_t attributes;
+    ::posix_spawnattr_init(&attributes);
+    // A program that is cut off leaves half of what it writes.
+    ::posix_spawnattr_setflags(&attributes, POSIX_SPAWN_SETPGROUP);
+    std::vector<std::string> variables = environmentOfPrograms();
+    const int error = ::posix_spawnp(&child, words.front().c_str(), &actions, &attributes,
+                                     pointersTo(words).data(), pointersTo(variables).data());
+    ::posix_spawnattr_destroy(&attributes);
+    ::posix_spawn_file_actions_destroy(&actions);
+    return error;
+}
+
+} // namespace
+
+std::optional<std::string> runProgram(std::vector<std::string> words, const MemoryFile &in,
+                                      const MemoryFile &out)
+{
+    const MemoryFile errors;
+    if (!in.isComplete() || !out.isComplete() || !errors.isComplete())
+    {
+        return std::generic_category().message(ENOMEM);
+    }
+    const std::string name = words.front();
+    pid_t child = 0;
+    const std::array<int, 3> descriptors{in.descriptor(), out.descriptor(), errors.descriptor()};
+    if (const int error = spawn(child, std::move(words), descriptors))
+    {
+        return name + ": " + std::generic_category().message(error);
     }
     int status = 0;
     while (::waitpid(child, &status, 0) < 0)
     {
         if (errno != EINTR)
         {
-            return false;
+            return name + ": " + std::generic_category().message(errno);
         }
     }
-    return status == 0;
+    return status == 0 ? std::nullopt : std::optional(errors.read());
 }
 
-} // namespace
-
-std::optional<std::string> runGit(const std::filesystem::path &folder,
-                                  std::vector<std::string> arguments, std::string_view input,
-                                  const std::vector<std::string> &variables)
+std::vector<std::string> gitWords(const std::filesystem::path &folder,
+                                  const std::vector<std::string> &arguments)
 {
     // Nothing of the user's runs meanwhile, and no line ending is a reason to fail.
-    arguments.insert(arguments.begin(),
-                     {"git", "-C", folder.string(), "-c", "core.hooksPath=/dev/null", "-c",
-                      "core.fsmonitor=false", "-c", "core.safecrlf=false"});
-    const Memory in(input);
-    const Memory out;
-    const bool succeeded = in.isComplete() && out.isComplete() &&
-                           run(std::move(arguments), environmentOfGit(variables), in, out);
-    return succeeded ? std::optional(out.read()) : std::nullopt;
+    std::vector<std::string> words{"git",
+                                   "-C",
+                                   folder.string(),
+                                   "-c",
+                                   "core.hooksPath=/dev/null",
+                                   "-c",
+                                   "core.fsmonitor=false",
+                                   "-c",
+                                   "core.safecrlf=false"};
+    words.insert(words.end(), arguments.begin(), arguments.end());
+    return words;
+}
+
+std::optional<std::string> runGit(const std::filesystem::path &folder,
+                                  const std::vector<std::string> &arguments, std::string_view input)
+{
+    const MemoryFile in(input);
+    const MemoryFile out;
+    const auto failure = runProgram(gitWords(folder, arguments), in, out);
+    return failure ? std::nullopt : std::optional(out.read());
 }
 
 std::map<std::string, std::string> readRemoteSettings(const std::filesystem::path &folder)

@@ -8,19 +8,27 @@
 #include <string_view>
 #include <vector>
 
+#include "MemoryFile.hpp"
+
 /// What the library does not give out is asked of the git program, as far as it is installed.
 namespace vclink::shell
 {
 
-/// Runs git. It reads its configuration, and of its own variables of the environment only those
-/// that are given here.
-/// @param folder the working copy
+/// Runs a program, without git's own variables in its environment. Ctrl-C does not reach it.
+/// @return nothing if it has ended with status 0, otherwise what it wrote to its standard error
+std::optional<std::string> runProgram(std::vector<std::string> words, const MemoryFile &in,
+                                      const MemoryFile &out);
+
+/// The words for git with these arguments, in a folder. It reads its configuration.
+std::vector<std::string> gitWords(const std::filesystem::path &folder,
+                                  const std::vector<std::string> &arguments);
+
+/// Runs git in a working copy.
 /// @param input what git reads; nothing by default
-/// @param variables of the environment, NAME=VALUE
 /// @return what git wrote to its standard output; nothing if it failed or is not installed
 std::optional<std::string> runGit(const std::filesystem::path &folder,
-                                  std::vector<std::string> arguments, std::string_view input = {},
-                                  const std::vector<std::string> &variables = {});
+                                  const std::vector<std::string> &arguments,
+                                  std::string_view input = {});
 
 /// Git's settings of branches and remotes, by their full names as git lists them; the last value of
 /// each.

@@ -9,6 +9,12 @@ namespace
 {
 
 constexpr Translation helpRows[] = {
+    {"The option '%1%' must follow the command.", "Die Option '%1%' muss nach dem Befehl stehen.",
+     "オプション '%1%' はコマンドの後に置いてください。"},
+    {"The option '%1%' must be before the command.", "Die Option '%1%' muss vor dem Befehl stehen.",
+     "オプション '%1%' はコマンドの前に置いてください。"},
+    {"\"%1%\" is none of the languages en, de and ja",
+     "\"%1%\" ist keine der Sprachen en, de und ja", "\"%1%\" は en、de、ja のどれでもありません"},
     {"Usage", "Aufruf", "使い方"},
     {"OPTION...", "OPTION...", "オプション..."},
     {"COMMAND ...", "BEFEHL ...", "コマンド ..."},

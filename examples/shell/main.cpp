@@ -55,6 +55,8 @@ ExitStatus runIn(Session &session, Command &command)
 
 ExitStatus runCommand(const Settings &settings, Command &command, Output &output)
 {
+    std::error_code ignored;
+    const std::filesystem::path start = std::filesystem::current_path(ignored);
     for (const std::string &folder : settings.folders)
     {
         // An empty one changes nothing, as with git.
@@ -70,7 +72,7 @@ ExitStatus runCommand(const Settings &settings, Command &command, Output &output
     {
         log.emplace(*settings.severities, progressLine);
     }
-    Session session(output, progressLine, settings.takesAnyBare);
+    Session session(output, progressLine, settings.takesAnyBare, start);
     return runIn(session, command);
 }
 
@@ -78,7 +80,8 @@ ExitStatus run(int argc, const char *const *argv)
 {
     try
     {
-        if (const std::optional<std::string> locale = findLocale(argc, argv))
+        const std::optional<std::string> locale = findLocale(argc, argv);
+        if (locale && isLanguage(*locale))
         {
             setLanguage(*locale);
         }

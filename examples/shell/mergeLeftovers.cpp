@@ -10,6 +10,7 @@
 #include "fl/i18n/convert.hpp"
 #include "namedPaths.hpp"
 #include "names.hpp"
+#include "renames.hpp"
 #include "revisions.hpp"
 #include "states.hpp"
 #include "texts.hpp"
@@ -148,7 +149,7 @@ void tellSetAside(CMAdapter &adapter)
     {
         return;
     }
-    const FileStateMap states = adapter.getFolderStates(adapter.getRootFolder());
+    const FileStateMap states = folderStates(adapter, adapter.getRootFolder());
     const FileStateMap files = findSetAside(adapter.getRootFolder(), states);
     if (!files.empty())
     {

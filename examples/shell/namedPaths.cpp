@@ -7,6 +7,7 @@
 
 #include "links.hpp"
 #include "names.hpp"
+#include "renames.hpp"
 #include "workingCopy.hpp"
 
 namespace vclink::shell
@@ -15,12 +16,6 @@ namespace
 {
 
 namespace fs = std::filesystem;
-
-bool isBelow(const ustring &path, const ustring &folder)
-{
-    return path.size() > folder.size() && path[folder.size()] == u'/' &&
-           path.compare(0, folder.size(), folder) == 0;
-}
 
 /// The states of a path and of what lies below it.
 FileStateMap pick(const FileStateMap &states, const upath &path)
@@ -54,13 +49,8 @@ void lookUpEntry(CMAdapter &adapter, const FileStateMap &states, NamedPath &name
         return;
     }
     named.states = pick(states, path);
-    if (named.states.empty())
-    {
-        // Of a renamed file that was asked for together with its old name, only that is told.
-        named.states = pick(adapter.getFileStates({named.path}), path);
-    }
     named.isFolder = !named.states.empty() &&
-                     isBelow(named.states.begin()->first.string(), path.string()) &&
+                     named.states.begin()->first.string() != path.string() &&
                      named.states.begin()->first.string() != path.string() + u'/';
 }
 
@@ -70,7 +60,7 @@ NamedPath lookUpFolder(CMAdapter &adapter, const std::string &argument, const fs
     std::error_code ignored;
     if (fs::is_directory(path, ignored))
     {
-        named.states = adapter.getFolderStates(named.path);
+        named.states = folderStates(adapter, named.path);
         named.isFolder = !named.states.empty();
     }
     return named;
@@ -79,18 +69,9 @@ NamedPath lookUpFolder(CMAdapter &adapter, const std::string &argument, const fs
 /// As Git knows what stands there, and what lay below it before it became a link.
 NamedPath lookUpLink(CMAdapter &adapter, const std::string &argument, const upath &entry)
 {
-    FileStateMap states = pick(adapter.getFolderStates(adapter.getRootFolder()), entry);
+    FileStateMap states = pick(folderStates(adapter, adapter.getRootFolder()), entry);
     const bool isFolder = !states.empty() && states.rbegin()->first.string() != entry.string();
     return {argument, entry, std::move(states), isFolder, true};
-}
-
-/// With a rename in the index, the states depend on which of its two names are asked for.
-bool isPlain(const FileStateMap &states)
-{
-    return !states.empty() && std::none_of(states.begin(), states.end(),
-                                           [](const auto &entry) {
-                                               return entry.second.getState() == FileState::Unknown;
-                                           });
 }
 
 } // namespace
@@ -100,15 +81,15 @@ FileStateMap statesOf(CMAdapter &adapter, const std::vector<upath> &files)
     constexpr std::size_t mostNames = 10;
     if (files.size() <= mostNames)
     {
-        return adapter.getFileStates(files);
+        return fileStates(adapter, files);
     }
-    const FileStateMap all = adapter.getFolderStates(adapter.getRootFolder());
+    const FileStateMap all = folderStates(adapter, adapter.getRootFolder());
     FileStateMap states;
     std::vector<upath> others;
     for (const upath &file : files)
     {
         FileStateMap found = pick(all, file);
-        if (isPlain(found))
+        if (!found.empty())
         {
             states.merge(found);
         }
@@ -117,7 +98,8 @@ FileStateMap statesOf(CMAdapter &adapter, const std::vector<upath> &files)
             others.push_back(file);
         }
     }
-    states.merge(adapter.getFileStates(others));
+    FileStateMap asked = fileStates(adapter, others);
+    states.merge(asked);
     return states;
 }
 
@@ -163,11 +145,6 @@ std::vector<NamedPath> lookUp(CMAdapter &adapter, const std::vector<std::string>
     return paths;
 }
 
-bool liesIn(const ustring &path, const ustring &folder)
-{
-    return path == folder || isBelow(path, folder);
-}
-
 bool isAddressable(const upath &path, const upath &root)
 {
     return relativeName(path, root).find(u'\\') == ustring::npos;
@@ -183,11 +160,6 @@ bool meansAllBelow(const ustring &name)
                             return (unit < 0x20) || special.find(unit) != std::u16string_view::npos;
                         }) &&
            name.back() != u' ';
-}
-
-upath canonicalForm(const upath &path)
-{
-    return makePath(fs::weakly_canonical(nativePath(path)));
 }
 
 FileStateMap filter(const FileStateMap &states,

@@ -6,6 +6,7 @@
 #include <string>
 #include <vector>
 
+#include "names.hpp"
 #include "vclink/CMAdapter.hpp"
 #include "vclink/FileStateMap.hpp"
 
@@ -42,19 +43,12 @@ std::vector<NamedPath> lookUp(CMAdapter &adapter, const std::vector<std::string>
 /// back end compares each name with each file, which takes longer.
 FileStateMap statesOf(CMAdapter &adapter, const std::vector<upath> &files);
 
-/// Whether a path is that of the folder or lies below it; both free of symbolic links.
-bool liesIn(const ustring &path, const ustring &folder);
-
 /// Whether the back end can be told of a file by its name: a backslash is a slash to it.
 bool isAddressable(const upath &path, const upath &root);
 
 /// Whether a name, relative to the root, means all below it where it is a folder's. Others are
 /// patterns, or become some on their way.
 bool meansAllBelow(const ustring &name);
-
-/// Free of symbolic links, which the back end follows in every element.
-/// @throws std::filesystem::filesystem_error
-upath canonicalForm(const upath &path);
 
 /// The files whose state `isMeant` holds for.
 FileStateMap filter(const FileStateMap &states,

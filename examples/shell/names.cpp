@@ -139,12 +139,21 @@ ustring relativeName(const upath &path, const upath &root)
     return text.substr(start);
 }
 
+bool liesIn(const ustring &path, const ustring &folder)
+{
+    return path == folder || (path.size() > folder.size() && path[folder.size()] == u'/' &&
+                              path.compare(0, folder.size(), folder) == 0);
+}
+
+upath canonicalForm(const upath &path)
+{
+    return makePath(std::filesystem::weakly_canonical(nativePath(path)));
+}
+
 ustring wayTo(const upath &path, const ustring &folder)
 {
     const ustring &text = path.string();
-    const bool isBelow = text.size() > folder.size() && text[folder.size()] == u'/' &&
-                         text.compare(0, folder.size(), folder) == 0;
-    return isBelow
+    return text != folder && liesIn(text, folder)
                ? text.substr(folder.size() + 1)
                : makePath(nativePath(path).lexically_relative(nativePath(upath(folder)))).string();
 }
@@ -163,6 +172,37 @@ std::string quoteName(const ustring &name)
     return isPlain ? text : '"' + text + '"';
 }
 
+std::string quoteForShell(const std::string &word)
+{
+    constexpr std::string_view plain = "abcdefghijklmnopqrstuvwxyzABCDEFGHIJKLMNOPQRSTUVWXYZ"
+                                       "0123456789-_./:@%+,=";
+    if (!word.empty() && word.find_first_not_of(plain) == std::string::npos)
+    {
+        return word;
+    }
+    // What is escaped in a message would be another name, except in this kind of quotes.
+    const ustring text = fl::i18n::utf8_to_ustring(word);
+    const bool isShown = escape(text, u"", u"").size() == text.size() &&
+                         std::none_of(text.begin(), text.end(), changesDirection);
+    std::string quoted = isShown ? "'" : "$'";
+    for (const char letter : word)
+    {
+        if (isShown)
+        {
+            quoted += letter == '\'' ? "'\\''" : std::string(1, letter);
+            continue;
+        }
+        std::array<char, 8> escaped{letter};
+        if (letter <= ' ' || letter == '\'' || letter == '\\' || letter == '\x7F')
+        {
+            std::snprintf(escaped.data(), escaped.size(), "\\%03o",
+                          static_cast<unsigned>(static_cast<unsigned char>(letter)));
+        }
+        quoted += escaped.data();
+    }
+    return quoted + '\'';
+}
+
 std::string makePrintable(const ustring &text)
 {
     return fl::i18n::ustring_to_utf8(escape(text, u"\n\t", u""));
@@ -171,6 +211,11 @@ std::string makePrintable(const ustring &text)
 std::string makePrintableLine(const ustring &text)
 {
     return fl::i18n::ustring_to_utf8(escape(text, u"", u""));
+}
+
+std::string showName(const std::string &name)
+{
+    return makePrintableLine(fl::i18n::utf8_to_ustring(name));
 }
 
 std::string escapeDirections(const std::string &text)

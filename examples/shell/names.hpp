@@ -27,6 +27,13 @@ std::filesystem::path nativePath(const upath &path);
 /// The path from `root` to `path`, which lies below it.
 ustring relativeName(const upath &path, const upath &root);
 
+/// Whether a path is that of the folder or lies below it; both free of symbolic links.
+bool liesIn(const ustring &path, const ustring &folder);
+
+/// Free of symbolic links, which the back end follows in every element.
+/// @throws std::filesystem::filesystem_error
+upath canonicalForm(const upath &path);
+
 /// The way from a folder to a path, both absolute and free of symbolic links: "." for the folder
 /// itself.
 ustring wayTo(const upath &path, const ustring &folder);
@@ -40,9 +47,15 @@ std::string showPath(const upath &path);
 /// the direction of writing is put in quotes too. Other names stay as they are.
 std::string quoteName(const ustring &name);
 
+/// A word as a person gives it to a shell, which reads the same bytes.
+std::string quoteForShell(const std::string &word);
+
 /// A text with what could do something to the terminal escaped as in quoteName(), line feeds and
 /// tabs left as they are.
 std::string makePrintable(const ustring &text);
+
+/// The name of a branch, remote or revision, for a message that has it in quotes.
+std::string showName(const std::string &name);
 
 /// As makePrintable(), with line feeds and tabs escaped too.
 std::string makePrintableLine(const ustring &text);

@@ -46,6 +46,9 @@ constexpr Translation refusalRows[] = {
      "名前の中のバックスラッシュはスラッシュとみなされます:"},
     {"as a symbolic link would be followed:", "weil einem symbolischen Link gefolgt würde:",
      "シンボリックリンクがたどられてしまいます:"},
+    {"as a submodule keeps its commit until \"git submodule update\":",
+     "weil ein Submodul seinen Commit bis zu \"git submodule update\" behält:",
+     "サブモジュールは \"git submodule update\" までそのコミットのままです:"},
     {"for a reason that is not known:", "aus unbekanntem Grund:", "理由は不明です:"},
     {"A rebase is under way. Continue it with \"git rebase --continue\", or undo it with \"git "
      "rebase --abort\".",
@@ -104,6 +107,20 @@ constexpr Translation refusalRows[] = {
      "nehmen Sie\nihn mit \"git cherry-pick --abort\" oder \"git revert --abort\" zurück.",
      "チェリーピックまたはリバートの途中です。\"vclink-shell commit\" で完了するか、\"git "
      "cherry-pick --abort\" または\n\"git revert --abort\" で取り消してください。"},
+    {"These files have uncommitted changes, and are others on that branch:%1%",
+     "Diese Dateien haben Änderungen ohne Commit und sind auf dem Branch andere:%1%",
+     "次のファイルには未コミットの変更があり、そのブランチでは内容が異なります:%1%"},
+    {"These files are not tracked, and that branch has something in their place:%1%",
+     "Diese Dateien kennt Git nicht, und der Branch hat etwas an ihrer Stelle:%1%",
+     "次のファイルは追跡されておらず、そのブランチの同じ場所に何かがあります:%1%"},
+    {"Nothing was switched. Commit the changes or revert them, move untracked files out of the "
+     "way, "
+     "and\nswitch again.",
+     "Es wurde nicht gewechselt. Committen oder verwerfen Sie die Änderungen, räumen Sie "
+     "unversionierte\nDateien aus dem Weg, und wechseln Sie noch einmal.",
+     "切り替えられませんでした。変更をコミットするか元に戻し、追跡されていないファイルを移してから"
+     "、"
+     "\nもう一度切り替えてください。"},
     {"These files have uncommitted changes:%1%", "Diese Dateien haben Änderungen ohne Commit:%1%",
      "次のファイルには未コミットの変更があります:%1%"},
     {"These files are not tracked, and the other side has something in their place:%1%",
@@ -151,12 +168,24 @@ constexpr Translation refusalRows[] = {
      "sie: Bringen Sie an seinen Platz, was Sie behalten wollen, und fügen Sie es hinzu.",
      "次のファイルは、元の名前を別のものが使っているため、名前が変わっています:%1%"
      "\nマージには含まれません。残したいものは元の場所に移して追加してください。"},
-    {"Nothing was reverted: git can't store what would be discarded. To discard it for good, use "
-     "--forget.",
-     "Nichts wurde verworfen: git kann nicht speichern, was verworfen würde. Um es endgültig zu "
-     "verwerfen,\nbenutzen Sie --forget.",
-     "何も元に戻されませんでした。破棄する内容を git で保存できません。完全に破棄するには --forget "
-     "を使って\nください。"},
+    {"Nothing was reverted, as what would be discarded can't be stored: %1%.\nTo discard it for "
+     "good, use --forget.",
+     "Nichts wurde verworfen, weil nicht gespeichert werden kann, was verworfen würde: %1%.\nUm es "
+     "endgültig zu verwerfen, benutzen Sie --forget.",
+     "破棄する内容を保存できないため、何も元に戻されませんでした: %1%。\n完全に破棄するには "
+     "--forget "
+     "を使ってください。"},
+    {"Nothing was reverted, as no copy can be kept of what would be discarded:%1%\nMove it out of "
+     "the way, or discard it for good with --forget.",
+     "Nichts wurde verworfen, weil hiervon keine Kopie möglich ist:%1%\nRäumen Sie es aus dem Weg, "
+     "oder verwerfen Sie es endgültig mit --forget.",
+     "次の内容の控えを作れないため、何も元に戻されませんでした:%1%\n別の場所に移すか、--forget "
+     "で完全に破棄してください。"},
+    {"a repository is in its place", "an seiner Stelle liegt ein Repository",
+     "その場所にリポジトリがあります"},
+    {"git can't read the index, or is not installed",
+     "git kann den Index nicht lesen oder ist nicht installiert",
+     "git がインデックスを読めないか、インストールされていません"},
     {"To restore what was discarded: %1%", "Verworfenes zurückholen: %1%",
      "破棄した内容を復元するには: %1%"},
     {"To restore what was staged: %1%", "Vorgemerktes zurückholen: %1%",

@@ -9,6 +9,7 @@
 #include "fl/i18n/convert.hpp"
 #include "links.hpp"
 #include "names.hpp"
+#include "renames.hpp"
 #include "states.hpp"
 #include "texts.hpp"
 #include "workingCopy.hpp"
@@ -29,6 +30,11 @@ bool hasFiles(const fs::path &folder)
          !error && entry != end; entry.increment(error))
     {
         std::error_code ignored;
+        if (entry->path().filename() == ".git")
+        {
+            entry.disable_recursion_pending();
+            continue;
+        }
         if (entry->is_symlink(ignored) || entry->is_regular_file(ignored))
         {
             return true;
@@ -40,10 +46,10 @@ bool hasFiles(const fs::path &folder)
 /// One question for the whole is cheaper than one for each file, but may be one without an answer.
 FileStateMap statesAfterwards(CMAdapter &adapter, const FileStateMap &files)
 {
-    FileStateMap states = adapter.getFolderStates(adapter.getRootFolder());
+    FileStateMap states = folderStates(adapter, adapter.getRootFolder());
     if (states.empty())
     {
-        states = adapter.getFileStates(addressable(files, adapter.getRootFolder()));
+        states = fileStates(adapter, addressable(files, adapter.getRootFolder()));
     }
     if (states.empty())
     {
@@ -133,7 +139,7 @@ void refuseStrays(const std::string &refusal, CMAdapter &adapter,
     if (!strays.empty())
     {
         throw ShellFailure(
-            refusal + ".\n" +
+            say("%1%.", refusal) + '\n' +
             say("A name with *, ? or [ is a pattern, and means these files too:%1%\nName them as "
                 "well if you mean them, or use git for the file with that name.",
                 listNames(strays)));
@@ -188,12 +194,14 @@ ExitStatus tellLeftOut(const std::string &refusal, const upath &root, const File
     // In the order in which they are told.
     FileStateMap unnamable;
     FileStateMap followed;
+    FileStateMap submodules;
     FileStateMap others;
     for (const auto &entry : leftOut)
     {
-        FileStateMap &files = !isAddressable(entry.first, root) ? unnamable
-                              : isFollowed(entry.first, root)   ? followed
-                                                                : others;
+        FileStateMap &files = !isAddressable(entry.first, root)      ? unnamable
+                              : isFollowed(entry.first, root)        ? followed
+                              : hasGitEntry(nativePath(entry.first)) ? submodules
+                                                                     : others;
         files.insert(files.end(), entry);
     }
     const auto tell = [&](const std::string &reason, const FileStateMap &files)
@@ -205,6 +213,7 @@ ExitStatus tellLeftOut(const std::string &refusal, const upath &root, const File
     };
     tell(say("as a backslash in a name is taken for a slash:"), unnamable);
     tell(say("as a symbolic link would be followed:"), followed);
+    tell(say("as a submodule keeps its commit until \"git submodule update\":"), submodules);
     tell(say("for a reason that is not known:"), others);
     return leftOut.empty() ? Done : Failed;
 }

@@ -1,14 +1,17 @@
 // SPDX-License-Identifier: MIT
 #include "remotes.hpp"
 
+#include <algorithm>
 #include <filesystem>
 #include <map>
 
 #include "Session.hpp"
 #include "arguments.hpp"
+#include "failures.hpp"
 #include "fl/i18n/convert.hpp"
 #include "gitProgram.hpp"
 #include "names.hpp"
+#include "suggestions.hpp"
 #include "texts.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
 
@@ -20,6 +23,42 @@ namespace
 std::map<std::string, std::string> settingsOf(Session &session)
 {
     return readRemoteSettings(nativePath(session.adapter().getRootFolder()));
+}
+
+/// The names of the remotes that git's settings have.
+std::vector<std::string> remotesOf(Session &session)
+{
+    const std::string begin = "remote.";
+    const std::string end = ".url";
+    std::vector<std::string> names;
+    for (const auto &[key, value] : settingsOf(session))
+    {
+        const bool isUrl = key.size() > begin.size() + end.size() && key.find(begin) == 0 &&
+                           key.compare(key.size() - end.size(), end.size(), end) == 0;
+        if (isUrl)
+        {
+            names.push_back(key.substr(begin.size(), key.size() - begin.size() - end.size()));
+        }
+    }
+    return names;
+}
+
+/// Anything but a name is an address.
+/// @throws ShellFailure
+void refuseUnknownRemote(Session &session, const std::string &name)
+{
+    const std::vector<std::string> known = remotesOf(session);
+    if (name.find_first_of("/:") != std::string::npos ||
+        std::find(known.begin(), known.end(), name) != known.end() ||
+        settingsOf(session).count("remote." + name + ".pushurl") != 0)
+    {
+        return;
+    }
+    const std::string word = showName(name);
+    throw ShellFailure(say("There is no remote '%1%'.", word) +
+                       (known.empty() && quoteForShell(name) == name
+                            ? ' ' + say("Add one with \"git remote add %1% ADDRESS\".", word)
+                            : suggest(name, known)));
 }
 
 } // namespace
@@ -61,6 +100,7 @@ std::string chooseRemote(Session &session, const CLI::Option &name, Direction di
 std::unique_ptr<git::GitRemote> openRemote(Session &session, const std::string &name)
 {
     CMAdapter &adapter = session.adapter();
+    refuseUnknownRemote(session, name);
     std::filesystem::current_path(nativePath(adapter.getRootFolder()));
     return git::GitRemote::create(name, adapter);
 }
@@ -80,6 +120,18 @@ std::optional<std::string> findCurrentBranch(const git::BranchManager &manager)
     {
         return std::nullopt;
     }
+}
+
+std::string hexadecimal(const git::GitRemoteHead::Id &id)
+{
+    constexpr const char *digits = "0123456789abcdef";
+    std::string text;
+    for (const unsigned char byte : id)
+    {
+        text += digits[byte >> 4U];
+        text += digits[byte & 0xFU];
+    }
+    return text;
 }
 
 std::vector<ustring> readRefspecs(const std::vector<std::string> &refspecs)

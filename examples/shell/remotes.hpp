@@ -41,6 +41,8 @@ bool isPushConfigured(Session &session, const std::string &remote);
 /// The short name of the current branch; nothing before the first commit, or if none is.
 std::optional<std::string> findCurrentBranch(const git::BranchManager &manager);
 
+std::string hexadecimal(const git::GitRemoteHead::Id &id);
+
 std::vector<ustring> readRefspecs(const std::vector<std::string> &refspecs);
 
 } // namespace vclink::shell

@@ -78,6 +78,8 @@ constexpr Translation resultRows[] = {
      "Nichts wurde hochgeladen: Es gibt keinen aktuellen Branch. Nennen Sie, was hochzuladen ist.",
      "何も送られませんでした。現在のブランチがありません。送るものを指定してください。"},
     {"%1% rejected:%2%", "%1% hat abgelehnt:%2%", "%1% が拒否しました:%2%"},
+    {"Everything is up to date at %1%.", "Bei %1% ist alles auf dem neuesten Stand.",
+     "%1% はすべて最新です。"},
     {"Pushed to %1%, as remote.%1%.push says.", "Zu %1% hochgeladen, wie remote.%1%.push es sagt.",
      "remote.%1%.push の設定に従って %1% に送りました。"},
     {"Nothing was removed", "Nichts wurde entfernt", "何も削除されませんでした"},

@@ -14,4 +14,7 @@ namespace vclink::shell
 std::optional<std::string> findRevision(const git::BranchManager &manager,
                                         const std::string &revision);
 
+/// Whether there is a local branch of this short name.
+bool isBranch(const git::BranchManager &manager, const std::string &name);
+
 } // namespace vclink::shell

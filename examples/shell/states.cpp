@@ -16,7 +16,7 @@ const std::array<StateWords, 8> stateWords{{
     {FileState::Missing, "missing", "\33[1;31m", "tracked, but gone from the disk"},
     {FileState::InConflict, "conflict", "\33[1;35m", "in a conflict that is not resolved yet"},
     {FileState::Unversioned, "unversioned", "\33[36m", "not tracked"},
-    {FileState::Unknown, "unknown", "\33[34m", "anything else, e.g. renamed and staged"},
+    {FileState::Unknown, "unknown", "\33[34m", "anything else, e.g. replaced by a symbolic link"},
 }};
 
 const StateWords &wordsFor(FileState state)

@@ -41,6 +41,12 @@ std::size_t distance(const std::string &left, const std::string &right)
     return table[left.size()][right.size()];
 }
 
+/// "main" for "refs/heads/main", "origin/main" for "refs/remotes/origin/main".
+std::string withoutFolder(const std::string &reference)
+{
+    return reference.substr(reference.find('/', std::string("refs/").size()) + 1);
+}
+
 std::string ask(const std::string &word)
 {
     return ' ' + say("Did you mean '%1%'?", word);
@@ -84,6 +90,25 @@ std::string suggestCommand(const std::string &word)
         }
     }
     return suggest(word, names);
+}
+
+std::string suggestBranch(const git::BranchManager &manager, const std::string &name)
+{
+    std::vector<std::string> names;
+    for (const git::BranchPointer &branch : manager.getRemoteBranches())
+    {
+        const std::string full = withoutFolder(branch.getName());
+        if (full.substr(full.find('/') + 1) == name)
+        {
+            return ' ' + say("Make it from %1% with \"vclink-shell branch %2% %1%\".", full, name);
+        }
+        names.push_back(full);
+    }
+    for (const git::BranchPointer &branch : manager.getLocalBranches())
+    {
+        names.push_back(withoutFolder(branch.getName()));
+    }
+    return suggest(name, names);
 }
 
 std::string suggestInstead(const std::string &command, const std::string &option)

@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: MIT
 #include "texts.hpp"
 
+#include <algorithm>
+#include <array>
 #include <string_view>
 #include <vector>
 
@@ -13,10 +15,14 @@ namespace vclink::shell
 namespace
 {
 
+std::string languageOf(const std::string &locale)
+{
+    return locale.substr(0, locale.find_first_of("_.@"));
+}
+
 std::string currentLanguage()
 {
-    const std::string name = fl::i18n::VkLocale::global().name();
-    return name.substr(0, name.find_first_of("_.@"));
+    return languageOf(fl::i18n::VkLocale::global().name());
 }
 
 const Translation *find(std::string_view english)
@@ -39,6 +45,12 @@ const Translation *find(std::string_view english)
 void setLanguage(const std::string &locale)
 {
     vclink_host::setGlobalLocale(fl::i18n::VkLocale(locale));
+}
+
+bool isLanguage(const std::string &locale)
+{
+    constexpr std::array<std::string_view, 5> languages{"en", "de", "ja", "C", "POSIX"};
+    return std::find(languages.begin(), languages.end(), languageOf(locale)) != languages.end();
 }
 
 std::string say(const char *english)

@@ -20,6 +20,9 @@ struct Translation
 /// Sets the language of the program and of the library's messages, by the name of a locale.
 void setLanguage(const std::string &locale);
 
+/// Whether the program speaks the language of a locale.
+bool isLanguage(const std::string &locale);
+
 /// A sentence in the language of the process's locale; in English if it has no other.
 std::string say(const char *english);
 

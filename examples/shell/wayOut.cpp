@@ -26,7 +26,8 @@ namespace
 
 namespace fs = std::filesystem;
 
-// GIT_ELOCKED, GIT_EOWNER.
+// GIT_ENONFASTFORWARD, GIT_ELOCKED, GIT_EOWNER.
+constexpr int isNoFastForward = -11;
 constexpr int isLocked = -14;
 constexpr int isOthers = -36;
 
@@ -112,6 +113,17 @@ void tellWayOut(Session &session)
         {
             tellLocks(session.adapter());
         }
+        else if (code == isNoFastForward)
+        {
+            complain(
+                say("Get the remote's commits with \"vclink-shell fetch\", merge them, and push "
+                    "again. To lose them there,\nput a plus before the branch: \"vclink-shell "
+                    "push REMOTE +BRANCH\"."));
+        }
+        else if (failure.getError().getMessage().find(u"unsupported ") == 0)
+        {
+            complain(explainFormat(nativePath(session.adapter().getRootFolder())));
+        }
         else if (code == isOthers || namesSetting)
         {
             const std::string root = nativePath(session.adapter().getRootFolder()).string();
@@ -143,6 +155,15 @@ void tellLocks(CMAdapter &adapter)
     }
 }
 
+std::string explainFormat(const fs::path &folder)
+{
+    const fs::path state = hasGitEntry(folder) ? stateFolder(folder) : folder;
+    return say(
+        "%1% has the format, in core.repositoryformatversion and extensions. If git can work "
+        "here,\nuse git.",
+        showPath(makePath((sharedFolder(state) / "config").lexically_normal())));
+}
+
 std::string explainOwner(const std::string &folder)
 {
     struct stat status = {};
@@ -154,7 +175,7 @@ std::string explainOwner(const std::string &folder)
     }
     return say("The repository belongs to %1%. If you trust it, run: git config --global --add "
                "safe.directory %2%",
-               nameOf(status.st_uid), folder);
+               nameOf(status.st_uid), quoteForShell(folder));
 }
 
 } // namespace vclink::shell

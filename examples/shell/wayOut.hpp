@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include <filesystem>
 #include <string>
 
 #include "vclink/CMAdapter.hpp"
@@ -16,6 +17,9 @@ void tellWayOut(Session &session);
 
 /// Names the locks in a repository, and how old they are.
 void tellLocks(CMAdapter &adapter);
+
+/// Where a repository says that it has a format which libgit2 does not support.
+std::string explainFormat(const std::filesystem::path &folder);
 
 /// How a repository of another user is opened; empty if this one belongs to who asks.
 std::string explainOwner(const std::string &folder);

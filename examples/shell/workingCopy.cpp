@@ -10,6 +10,7 @@
 
 #include "failures.hpp"
 #include "names.hpp"
+#include "renames.hpp"
 #include "revisions.hpp"
 #include "texts.hpp"
 #include "vclink/git/BranchManager.hpp"
@@ -110,7 +111,7 @@ fs::path stateFolder(const fs::path &root)
 
 FileStateMap wholeStates(CMAdapter &adapter)
 {
-    FileStateMap states = adapter.getFolderStates(adapter.getRootFolder());
+    FileStateMap states = folderStates(adapter, adapter.getRootFolder());
     if (states.empty())
     {
         refuseUnknownStates(adapter);

@@ -61,8 +61,20 @@ TEST_F(ShellAdd, RefusesFilesThatGitKnowsAndAddsNothing)
     repository_.write("new", "");
     repository_.write("b", "edited\n");
     EXPECT_EQ(refuse({"add", "new", "b", "a"}),
-              "Nothing was added, because these files are not new to Git:\n" +
-                  (repository_ / "a").string() + "\n" + (repository_ / "b").string() + "\n");
+              "Nothing was added, because these files are not new to Git:\n  a\n  b\n");
+    EXPECT_EQ(runIn(repository_ / "folder", {"add", "../a"}).errors,
+              "vclink-shell: Nothing was added, because these files are not new to Git:\n  ../a\n");
+}
+
+TEST_F(ShellAdd, TracksAgainWhatWasRemoved)
+{
+    repository_.git({"rm", "--quiet", "--cached", "a", "b", "folder/c"});
+    repository_.write("a", "other\n");
+    repository_.remove("b");
+    succeed({"add", "a"});
+    EXPECT_EQ(repository_.git({"show", ":a"}), "other\n");
+    succeed({"add", "."});
+    EXPECT_THAT(letters(), ElementsAre(Pair("a", "M "), Pair("b", "D ")));
 }
 
 TEST_F(ShellAdd, RefusesEachNameThatItCannotServeWithTheReason)

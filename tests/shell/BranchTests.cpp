@@ -146,7 +146,6 @@ TEST_F(ShellBranches, AreNotMadeOrDeletedWhereThatCannotBe)
         std::string reason;
     } cases[] = {
         {{"branch", "topic", "main"}, "a reference with that name already exists"},
-        {{"branch", "new", "nothing"}, "no reference found for shorthand 'nothing'"},
         {{"branch", "new", head()}, "no reference found for shorthand"},
         {{"branch", "new", "main~0"},
          "\nvclink-shell: START must be the name of a branch or a tag. For any other commit, use "
@@ -154,10 +153,6 @@ TEST_F(ShellBranches, AreNotMadeOrDeletedWhereThatCannotBe)
         {{"branch", "two words", "main"}, "not valid"},
         {{"branch", "topic/below", "main"}, "topic"},
         {{"branch", "-d", "main"}, "it is the current HEAD"},
-        {{"branch", "-d", "nothing"}, "cannot locate local branch 'nothing'"},
-        {{"branch", "-d", "v1"}, "cannot locate local branch 'v1'"},
-        {{"branch", "-d", "refs/heads/topic"}, "cannot locate local branch"},
-        {{"branch", "-d", "--", "-x"}, "'-x'"},
     };
     for (const auto &[arguments, reason] : cases)
     {
@@ -165,6 +160,18 @@ TEST_F(ShellBranches, AreNotMadeOrDeletedWhereThatCannotBe)
         EXPECT_THAT(errors, StartsWith(text));
         EXPECT_THAT(errors, HasSubstr(reason));
     }
+}
+
+TEST_F(ShellBranches, AreNotThereUnderAnotherName)
+{
+    repository_.git({"tag", "v1"});
+    repository_.git({"branch", "topic"});
+    EXPECT_EQ(refuse({"branch", "-d", "topci"}),
+              "There is no branch 'topci'. Did you mean 'topic'?\n");
+    for (const std::string name : {"nothing", "v1", "refs/heads/topic", "-x"})
+        EXPECT_EQ(refuse({"branch", "-d", "--", name}), "There is no branch '" + name + "'.\n");
+    EXPECT_EQ(refuse({"branch", "new", "nothing"}),
+              "There is no branch and no commit 'nothing'.\n");
 }
 
 TEST_F(ShellBranches, TellTheirFailuresInTheLanguageThatWasAskedFor)

@@ -83,6 +83,18 @@ TEST_F(ShellClone, TakesAPathFromTheCurrentFolderAndRemembersAllOfIt)
     EXPECT_EQ(made.line({"config", "remote.origin.url"}), repository_.path());
 }
 
+TEST_F(ShellClone, RefusesAPathOfNothing)
+{
+    for (const std::string name : {"typo", "./a:b", "/nowhere/x"})
+    {
+        const CommandResult result = runIn(repository_.path(), {"clone", name});
+        EXPECT_EQ(result.exitStatus, 1);
+        EXPECT_EQ(result.errors, "vclink-shell: Nothing was cloned: " + name +
+                                     " can't be found: No such file or directory.\n");
+        EXPECT_FALSE(fs::exists(repository_ / name));
+    }
+}
+
 TEST_F(ShellClone, TakesAnAddressOfAFileAsItStands)
 {
     const std::string address = "file://" + repository_.path().string();
@@ -137,7 +149,7 @@ TEST_F(ShellClone, TellsWhyThereIsNothingToClone)
 {
     fs::create_directory(folder() / "nothing");
     EXPECT_THAT(fail("nothing"), HasSubstr("could not find repository"));
-    EXPECT_THAT(fail("nowhere"), HasSubstr("unsupported URL protocol"));
+    EXPECT_THAT(fail("nowhere"), HasSubstr("nowhere can't be found"));
     EXPECT_THAT(fail("strange://host/path"),
                 HasSubstr(libgit2Release::refusalOfScheme("strange://host/path")));
     EXPECT_THAT(fail(daemon().base() + "/missing.git"), HasSubstr("no such repository"));

@@ -12,6 +12,7 @@ namespace vclink::test
 namespace
 {
 
+using testing::AllOf;
 using testing::HasSubstr;
 using testing::Not;
 using testing::StartsWith;
@@ -42,7 +43,13 @@ TEST_F(ShellFailures, AreToldInTheLanguageThatWasAskedFor)
     EXPECT_THAT(result.errors, StartsWith(germanFailure));
     EXPECT_THAT(runIn(repository.path(), {"--lang", "ja_JP.UTF-8", "status"}).errors,
                 HasSubstr("\xE3\x82\xB3\xE3\x83\xBC\xE3\x83\x89 -1"));
-    EXPECT_THAT(runIn(repository.path(), {"--lang", "xx", "status"}).errors, StartsWith(english));
+    const CommandResult unknown = runIn(repository.path(), {"--lang", "xx", "status"});
+    EXPECT_EQ(unknown.exitStatus, 2);
+    EXPECT_THAT(
+        unknown.errors,
+        StartsWith("vclink-shell: --lang: \"xx\" is none of the languages en, de and ja.\n"));
+    EXPECT_THAT(runIn(repository.path(), {"--lang", "ja", "--progress", "x", "status"}).errors,
+                HasSubstr("\xE3\x80\x82\n"));
 }
 
 TEST_F(ShellFailures, AreToldInTheLanguageOfTheEnvironmentUnlessAnotherWasAskedFor)
@@ -86,7 +93,12 @@ TEST_F(ShellFailures, SayWhyARepositoryCannotBeOpened)
     const GitRepository repository = makeRepository();
     repository.git({"config", "core.repositoryFormatVersion", "9"});
     EXPECT_THAT(runIn(repository.path(), {"status"}).errors,
-                HasSubstr("unsupported repository version"));
+                AllOf(HasSubstr("unsupported repository version"),
+                      HasSubstr(": .git/config has the format, in core.repositoryformatversion")));
+    repository.write(".git/config",
+                     "[core]\nrepositoryformatversion = 1\n[extensions]\nstrange = true\n");
+    EXPECT_THAT(runIn(repository.path(), {"status"}).errors,
+                AllOf(HasSubstr("unsupported extension"), HasSubstr(".git/config has the format")));
 }
 
 TEST_F(ShellFailures, SayHowARepositoryOfAnotherUserIsTrusted)

@@ -76,13 +76,20 @@ TEST_F(ShellFetch, TellsAPersonHowMuchHasChanged)
     EXPECT_EQ(show({"fetch", "origin", "refs/heads/new:refs/mine/new"}),
               "Fetched from origin: 1 reference changed.\n");
     EXPECT_EQ(show({"fetch", "origin"}), "There was nothing new at origin.\n");
-    EXPECT_EQ(show({"fetch", "origin", "refs/heads/missing:refs/mine/missing"}),
-              "There was nothing new at origin.\n");
+    EXPECT_EQ(refuse({"fetch", "origin", "refs/heads/missing:refs/mine/missing"}),
+              "Nothing was fetched: origin has no reference 'refs/heads/missing'.\n");
+    EXPECT_EQ(refuse({"fetch", "origin", "main", "mian"}),
+              "Nothing was fetched: origin has no reference 'mian'. Did you mean 'main'?\n");
 }
 
 TEST_F(ShellFetch, RefusesARemoteThatIsNotConfigured)
 {
-    EXPECT_THAT(refuse({"fetch", "nobody"}), HasSubstr("remote 'nobody' does not exist"));
+    EXPECT_THAT(refuse({"fetch", "nobody"}), StartsWith("There is no remote 'nobody'."));
+    EXPECT_EQ(refuse({"fetch", "orgin"}), "There is no remote 'orgin'. Did you mean 'origin'?\n");
+    repository_.git({"remote", "remove", "origin"});
+    EXPECT_EQ(refuse({"fetch"}),
+              "There is no remote 'origin'. Add one with \"git remote add origin "
+              "ADDRESS\".\n");
     EXPECT_THAT(refuse({"fetch", url_}), HasSubstr("is not a valid remote name"));
 }
 

@@ -91,7 +91,7 @@ TEST_F(ShellHeads, AreFoundFromTheRootWhereTheAddressIsARelativePath)
 
 TEST_F(ShellHeads, CannotBeAskedOfARemoteThatIsNotThere)
 {
-    EXPECT_THAT(refuse({"heads", "nobody"}), HasSubstr("remote 'nobody' does not exist"));
+    EXPECT_THAT(refuse({"heads", "nobody"}), HasSubstr("There is no remote 'nobody'."));
     repository_.git({"remote", "set-url", "origin", daemon().base() + "/missing.git"});
     EXPECT_THAT(refuse({"heads", "origin"}), HasSubstr("no such repository"));
 }

@@ -172,7 +172,7 @@ TEST_F(ShellMerge, TellsItsFailuresInTheLanguageThatWasAskedFor)
     EXPECT_THAT(fail({"--lang", "de", "merge", "other"}),
                 StartsWith(german + "Eine Zusammenführung kann nicht beginnen"));
     repository_.git({"merge", "--abort"});
-    EXPECT_THAT(fail({"--lang", "de", "merge", "nothing"}),
+    EXPECT_THAT(fail({"--lang", "de", "merge", "HEAD:a"}),
                 HasSubstr("\nGit konnte den Vorgang nicht abschließen: "));
 }
 
@@ -180,9 +180,10 @@ TEST_F(ShellMerge, ChangesNothingWhereItCannotBegin)
 {
     diverge();
     EXPECT_EQ(refuse({"merge", "nothing"}),
-              "\"nothing\" could not be merged into the current branch.\nGit could not complete "
-              "the operation: revspec 'nothing' not found (code -3, category 4)\n");
-    EXPECT_THAT(refuse({"merge", "--", "-x"}), StartsWith("\"-x\" could not be merged"));
+              "Nothing was merged: there is no branch and no commit 'nothing'.\n");
+    EXPECT_EQ(refuse({"merge", "othr"}), "Nothing was merged: there is no branch and no commit "
+                                         "'othr'. Did you mean 'other'?\n");
+    EXPECT_THAT(refuse({"merge", "--", "-x"}), HasSubstr("no commit '-x'"));
     EXPECT_THAT(refuse({"merge", "HEAD:a"}), StartsWith("\"HEAD:a\" could not be merged"));
     repository_.git({"config", "merge.ff", "only"});
     EXPECT_THAT(refuse({"merge", "other"}), HasSubstr("(merge.ff is set to \"only\")"));

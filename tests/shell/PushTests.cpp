@@ -72,8 +72,10 @@ TEST_F(ShellPush, MakesAndDeletesBranchesAndTags)
 TEST_F(ShellPush, LosesNoCommitsOfOthersUnlessToldTo)
 {
     overtake();
-    EXPECT_THAT(refuse({"push", "origin", "refs/heads/main"}),
-                HasSubstr("contains commits that are not present locally"));
+    EXPECT_THAT(
+        refuse({"push", "origin", "refs/heads/main"}),
+        HasSubstr("contains commits that are not present locally. (code -11, category "
+                  "4)\nvclink-shell: Get the remote's commits with \"vclink-shell fetch\""));
     succeed({"push", "origin", "+refs/heads/main"});
     EXPECT_EQ(served("refs/heads/main"), commit_);
 }
@@ -86,7 +88,8 @@ TEST_F(ShellPush, NamesWhatTheServerRejectsAndPushesTheRest)
         run({"push", "origin", "refs/heads/main", "refs/heads/main:refs/heads/new"});
     EXPECT_EQ(result.exitStatus, 1);
     EXPECT_EQ(result.output, "");
-    EXPECT_EQ(result.errors, "remote: closed\n"
+    EXPECT_EQ(result.errors, "Pushed main to new at origin.\n"
+                             "remote: closed\n"
                              "remote: error: hook declined to update refs/heads/main\n"
                              "vclink-shell: origin rejected:\n"
                              "  refs/heads/main: hook declined\n");
@@ -179,10 +182,13 @@ TEST_F(ShellPush, CompletesShortNames)
 
 TEST_F(ShellPush, RefusesWhatNamesNoCommit)
 {
-    EXPECT_THAT(refuse({"push", "origin", "missing:refs/heads/new"}),
-                HasSubstr("src refspec 'missing' does not match any existing object"));
-    EXPECT_THAT(refuse({"push", "nobody", "refs/heads/main"}),
-                HasSubstr("remote 'nobody' does not exist"));
+    for (const std::string target : {"refs/heads/new", "new"})
+        EXPECT_EQ(refuse({"push", "origin", "missing:" + target}),
+                  "Nothing was pushed: there is no branch and no tag 'missing' here.\n");
+    EXPECT_EQ(refuse({"push", "origin", "mian"}),
+              "Nothing was pushed: there is no branch and no tag "
+              "'mian' here. Did you mean 'main'?\n");
+    EXPECT_EQ(refuse({"push", "nobody", "refs/heads/main"}), "There is no remote 'nobody'.\n");
 }
 
 TEST_F(ShellPush, GoesToAnotherFolderIfThatHasNoFilesOnTheDisk)
@@ -206,13 +212,18 @@ TEST_F(ShellPush, TellsAPersonWhatWasPushedWhere)
               "Pushed main to origin.\nPushed main to new at origin.\n"
               "Pushed main to third at origin.\n");
     EXPECT_EQ(show({"push", "origin", ":new"}), "Deleted new at origin.\n");
+    EXPECT_EQ(show({"push"}), "Everything is up to date at origin.\n");
+    EXPECT_EQ(show({"push", "origin", "main", "main:fourth"}),
+              "Pushed main to fourth at origin.\n");
+    served_.git({"update-ref", "-d", "refs/heads/main"});
     EXPECT_EQ(show({"push"}), "Pushed main to origin.\n");
+    EXPECT_EQ(served("refs/heads/main"), commit_);
 }
 
 TEST_F(ShellPush, TellsItsFailureInTheLanguageThatWasAskedFor)
 {
-    EXPECT_THAT(refuse({"--lang", "de", "push", "nobody", "main"}),
-                StartsWith("Git konnte den Vorgang nicht "));
+    EXPECT_EQ(refuse({"--lang", "de", "push", "nobody", "main"}),
+              "Es gibt kein Remote 'nobody'.\n");
 }
 
 } // namespace

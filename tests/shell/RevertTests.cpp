@@ -1,4 +1,9 @@
 // SPDX-License-Identifier: MIT
+#include <filesystem>
+#include <map>
+#include <string>
+#include <vector>
+
 #include <gmock/gmock.h>
 
 #include "ChangeFixture.hpp"
@@ -27,6 +32,17 @@ class ShellRevert : public ChangeFixture
         repository_.write("folder/added", "added\n");
         repository_.add({"folder/added"});
         repository_.write("folder/new", "new\n");
+    }
+
+    /// Does what the lines say that a revert has written.
+    static void restore(const std::string &errors, const std::filesystem::path &place)
+    {
+        for (const std::string &line : split(errors, '\n'))
+        {
+            const std::string command = "set -o pipefail; " + line.substr(line.find(": git ") + 2);
+            const CommandResult result = Command({"bash", "-c", command}).in(place).run();
+            EXPECT_EQ(result.exitStatus, 0) << line << '\n' << result.errors;
+        }
     }
 };
 
@@ -139,18 +155,11 @@ TEST_F(ShellRevert, KeepsWhatItDiscardsAndSaysHowToRestoreIt)
     EXPECT_EQ(repository_.git({"status", "--porcelain"}), "?? added\n");
     const std::vector<std::string> lines = split(result.errors, '\n');
     ASSERT_EQ(lines.size(), 2U) << result.errors;
-    EXPECT_THAT(lines[0], StartsWith("To restore what was discarded: git restore --overlay "));
-    EXPECT_THAT(lines[1], StartsWith("To restore what was staged: git restore --overlay --staged"));
-    for (const std::string &line : lines)
-        EXPECT_EQ(Command({"sh", "-c", line.substr(line.find("git "))})
-                      .in(repository_ / "folder/deep")
-                      .run()
-                      .exitStatus,
-                  0);
-    EXPECT_EQ(repository_.read("a") + repository_.read("b") + repository_.read("folder/c"),
-              "edited\non the disk\nstaged\n");
-    EXPECT_EQ(repository_.git({"show", ":b"}) + repository_.git({"show", ":added"}),
-              "staged\nstaged\n");
+    EXPECT_THAT(lines[0], StartsWith("To restore what was discarded: git -C ../.. cat-file "));
+    EXPECT_THAT(lines[1], StartsWith("To restore what was staged: git -C ../.. restore "));
+    restore(result.errors, repository_ / "folder/deep");
+    EXPECT_EQ(repository_.read("a") + repository_.read("b"), "edited\non the disk\n");
+    EXPECT_EQ(repository_.git({"show", ":b", ":added", ":folder/c"}), "staged\nstaged\nstaged\n");
     EXPECT_EQ(repository_.read("folder/deep/d"), "folder/deep/d\n");
 }
 
@@ -162,11 +171,92 @@ TEST_F(ShellRevert, KeepsWhatIsInThePlaceOfAFile)
     repository_.write("folder", "a file\n");
     const std::string line = runIn(repository_.path(), {"revert", "."}).errors;
     EXPECT_EQ(repository_.read("a") + repository_.read("folder/c"), "a\nfolder/c\n");
-    const std::string option = "--source=";
-    const std::size_t start = line.find(option) + option.size();
-    const std::string tree = line.substr(start, line.find(' ', start) - start);
-    EXPECT_EQ(repository_.git({"show", tree + ":a/notes"}), "notes\n");
-    EXPECT_EQ(repository_.git({"show", tree + ":folder"}), "a file\n");
+    restore(line, repository_.path());
+    EXPECT_EQ(repository_.read("a/notes") + repository_.read("folder"), "notes\na file\n");
+}
+
+TEST_F(ShellRevert, KeepsTheBytesOfTheDiskThatFiltersChange)
+{
+    repository_.write(".gitattributes", "*.txt text eol=crlf\n*.id ident\n*.up filter=case\n");
+    repository_.git({"config", "filter.case.clean", "tr a-z A-Z"});
+    repository_.git({"config", "filter.case.smudge", "tr A-Z a-z"});
+    const std::map<std::string, std::string> kept{
+        {"lines.txt", "one\r\ntwo\n"}, {"x.id", "$Id: edited$\n"}, {"x.up", "Both Cases\n"},
+        {"new\nline \"", "odd\n"},     {"-dash", "dash\n"},        {"\xFF", "byte\n"}};
+    for (const auto &[name, text] : kept)
+        repository_.write(name, "");
+    std::filesystem::create_symlink("nowhere", repository_ / "link");
+    repository_.commitAll("filters");
+    for (const auto &[name, text] : kept)
+        repository_.write(name, text);
+    std::filesystem::permissions(repository_ / "x.up", std::filesystem::perms::all);
+    std::filesystem::remove(repository_ / "link");
+    std::filesystem::create_symlink("to\nnowhere ", repository_ / "link");
+    const std::string line = runIn(repository_.path(), {"revert", "."}).errors;
+    EXPECT_EQ(std::filesystem::read_symlink(repository_ / "link"), "nowhere");
+    restore(line, repository_.path());
+    for (const auto &[name, text] : kept)
+        EXPECT_EQ(repository_.read(name), text) << name;
+    EXPECT_EQ(std::filesystem::status(repository_ / "x.up").permissions(),
+              std::filesystem::perms::all);
+    EXPECT_EQ(std::filesystem::read_symlink(repository_ / "link"), "to\nnowhere ");
+}
+
+TEST_F(ShellRevert, KeepsANewFileUnderTheOldNameOfARenamedOne)
+{
+    const std::string text = "a text that is long enough to be found again\n";
+    repository_.write("long", text);
+    repository_.commitAll("long");
+    repository_.git({"mv", "long", "renamed"});
+    repository_.write("long", text + "new\n");
+    const std::string line = runIn(repository_.path(), {"revert", "."}).errors;
+    EXPECT_EQ(repository_.read("long"), text);
+    restore(line, repository_.path());
+    EXPECT_EQ(repository_.read("long"), text + "new\n");
+}
+
+TEST_F(ShellRevert, KeepsFilesThatGitWasToldNotToLookAt)
+{
+    repository_.git({"update-index", "--assume-unchanged", "a"});
+    repository_.git({"update-index", "--skip-worktree", "b"});
+    for (const std::vector<std::string> &names :
+         std::vector<std::vector<std::string>>{{"."}, {"a", "b"}})
+    {
+        repository_.write("a", "edited a\n");
+        repository_.write("b", "edited b\n");
+        std::vector<std::string> arguments{"revert"};
+        arguments.insert(arguments.end(), names.begin(), names.end());
+        const CommandResult result = runIn(repository_.path(), arguments);
+        EXPECT_EQ(repository_.read("a") + repository_.read("b"), "a\nb\n");
+        restore(result.errors, repository_.path());
+        EXPECT_EQ(repository_.read("a") + repository_.read("b"), "edited a\nedited b\n");
+    }
+}
+
+TEST_F(ShellRevert, SaysHowToRestoreFromWhereThePersonIs)
+{
+    std::filesystem::rename(repository_.path(), folder() / "it's a\nfolder");
+    const GitRepository moved(folder() / "it's a\nfolder");
+    moved.write("a", "edited\n");
+    const std::string line =
+        runIn(folder().path(), {"-C", moved / "folder", "revert", "../a"}).errors;
+    EXPECT_EQ(moved.read("a"), "a\n");
+    restore(line, folder().path());
+    EXPECT_EQ(moved.read("a"), "edited\n");
+}
+
+TEST_F(ShellRevert, DiscardsNoRepositoryInThePlaceOfAFile)
+{
+    repository_.remove("a");
+    repository_.write("b", "edited\n");
+    const GitRepository inner = makeRepository("repository/a/inner");
+    inner.write("work", "");
+    EXPECT_EQ(
+        runIn(repository_ / "folder", {"revert", "../a", "../b"}).errors,
+        "vclink-shell: Nothing was reverted, as no copy can be kept of what would be "
+        "discarded:\n  ../a: a repository is in its place\nMove it out of the way, or discard "
+        "it for good with --forget.\n");
+    EXPECT_EQ(repository_.read("b") + inner.read("work"), "edited\n");
 }
 
 TEST_F(ShellRevert, KeepsNothingWhereNothingIsDiscardedOrWhenToldTo)
@@ -190,11 +280,26 @@ TEST_F(ShellRevert, DiscardsNothingThatCannotBeKept)
                                      .environment("PATH", folder().path().string())
                                      .run();
     EXPECT_EQ(result.exitStatus, 1);
-    EXPECT_EQ(result.errors,
-              "vclink-shell: Nothing was reverted: git can't store what would be discarded. To "
-              "discard it for good, use --forget.\n");
+    EXPECT_EQ(
+        result.errors,
+        "vclink-shell: Nothing was reverted, as what would be discarded can't be stored: git "
+        "can't read the index, or is not installed.\nTo discard it for good, use --forget.\n");
     EXPECT_EQ(repository_.read("a"), "edited\n");
     EXPECT_TRUE(std::filesystem::is_empty(environment().temporary()));
+}
+
+TEST_F(ShellRevert, SaysWhyASubmoduleKeepsItsCommit)
+{
+    GitRepository inner = makeRepository("repository/inner");
+    inner.write("file", "");
+    inner.commitAll("inner");
+    repository_.commitAll("with inner");
+    inner.write("file", "more\n");
+    inner.commitAll("more");
+    const CommandResult result = runIn(repository_.path(), {"revert", "."});
+    EXPECT_EQ(result.exitStatus, 1);
+    EXPECT_EQ(result.errors, "vclink-shell: Not all were reverted, as a submodule keeps its commit "
+                             "until \"git submodule update\":\n  inner\n");
 }
 
 TEST_F(ShellRevert, RefusesFilesInConflictAndRevertsNothing)
@@ -202,8 +307,7 @@ TEST_F(ShellRevert, RefusesFilesInConflictAndRevertsNothing)
     makeConflict();
     repository_.write("folder/c", "edited\n");
     const std::string reason =
-        "Nothing was reverted, because these files have unresolved conflicts:\n" +
-        (repository_ / "a").string() + '\n';
+        "Nothing was reverted, because these files have unresolved conflicts:\n  a\n";
     EXPECT_EQ(refuse({"revert", "folder/c", "a"}), reason);
     EXPECT_EQ(refuse({"revert", "."}), reason);
 }

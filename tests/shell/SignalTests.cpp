@@ -298,6 +298,19 @@ TEST_F(ShellSignals, LeaveNoHalfClone)
         });
 }
 
+TEST_F(ShellSignals, LeaveNothingOfARevert)
+{
+    for (int number = 0; number < fileCount; ++number)
+        template_.write(nameOf(number), "edited\n");
+    expectNothingLeft(
+        {"revert", "."},
+        [](const GitRepository &copy)
+        {
+            const auto changes = split(copy.git({"status", "--porcelain"}), '\n');
+            expectOneOf(std::to_string(changes.size()), {"0", std::to_string(fileCount)});
+        });
+}
+
 TEST_F(ShellSignals, LeaveNothingOfACommit)
 {
     for (int number = 0; number < fileCount; ++number)

@@ -28,9 +28,15 @@ TEST_F(ShellState, HasNoCurrentBranchBeforeTheFirstCommitOrOnACommit)
     const CommandResult unborn = runIn(empty.path(), {"current"});
     EXPECT_EQ(unborn.exitStatus, 1);
     EXPECT_EQ(unborn.output, "");
-    EXPECT_THAT(unborn.errors, HasSubstr("refs/heads/main"));
+    EXPECT_EQ(unborn.errors,
+              "vclink-shell: There is no current branch: nothing was committed yet.\n");
+    EXPECT_EQ(runIn(empty.path(), {"branch", "new"}).errors,
+              "vclink-shell: There is no commit yet that a branch could begin at.\n");
+    EXPECT_EQ(runIn(empty.path(), {"revert", "."}).errors,
+              "vclink-shell: Nothing was reverted:\n  .: there are no files in it\n");
     repository_.git({"checkout", "--quiet", "--detach"});
-    EXPECT_THAT(refuse({"current"}), StartsWith("Git could not complete the operation: "));
+    EXPECT_EQ(refuse({"current"}),
+              "There is no current branch: HEAD is at a commit, not at a branch.\n");
 }
 
 TEST_F(ShellState, ShowsTheIdThatGitGivesARevision)

@@ -107,14 +107,31 @@ TEST_F(ShellStatus, TellsTheStateOfEveryFileAsGitReportsIt)
     EXPECT_EQ(asMap(statesIn(repository.path())), expected);
 }
 
-TEST_F(ShellStatus, TellsARenamedFileAsUnknownUnderItsOldName)
+TEST_F(ShellStatus, TellsBothNamesOfARenamedFile)
 {
     GitRepository repository = makeRepository();
     repository.write("old", "a text that is long enough to be found again\n");
     repository.commitAll("begin");
     repository.git({"mv", "old", "new"});
     EXPECT_EQ(repository.git({"status", "--porcelain"}), "R  old -> new\n");
-    EXPECT_THAT(statesIn(repository.path()), ElementsAre(Record("unknown", "old")));
+    EXPECT_THAT(statesIn(repository.path()),
+                ElementsAre(Record("added", "new"), Record("deleted", "old")));
+}
+
+TEST_F(ShellStatus, TellsBothNamesOfARenamedFileWhereANewOneHasTheOldName)
+{
+    GitRepository repository = makeRepository();
+    repository.write("old", "a text that is long enough to be found again\n");
+    repository.write("folder/kept", "");
+    repository.commitAll("begin");
+    repository.git({"mv", "old", "folder/new"});
+    repository.write("old", "a text that is long enough to be found again, too\n");
+    EXPECT_THAT(statesIn(repository.path()),
+                ElementsAre(Record("clean", "folder/kept"), Record("added", "folder/new"),
+                            Record("deleted", "old")));
+    EXPECT_THAT(statesIn(repository.path(), {"folder"}),
+                ElementsAre(Record("clean", "folder/kept"), Record("added", "folder/new")));
+    EXPECT_THAT(statesIn(repository.path(), {"old"}), ElementsAre(Record("deleted", "old")));
 }
 
 TEST_F(ShellStatus, WritesOneLineAFileWithATabBetweenStateAndPath)

@@ -53,7 +53,12 @@ TEST_F(ShellSwitch, KeepsChangesOfFilesThatTheBranchDoesNotTouch)
 TEST_F(ShellSwitch, ChangesNothingWhereAChangeIsInTheWay)
 {
     repository_.write("a", "edited\n");
-    EXPECT_THAT(refuse({"switch", "other"}), HasSubstr("1 conflict prevents checkout"));
+    repository_.write("folder/mine", "");
+    EXPECT_THAT(refuse({"switch", "other"}),
+                EndsWith(" (code -13, category 20)\nvclink-shell: These files have uncommitted "
+                         "changes, and are others on that branch:\n  a\nvclink-shell: Nothing was "
+                         "switched. Commit the changes or revert them, move untracked files out of "
+                         "the way, and\nswitch again.\n"));
     EXPECT_THAT(refuse({"--lang", "de", "switch", "other"}),
                 StartsWith("Git konnte den Vorgang nicht abschließen: "));
 }
@@ -62,8 +67,38 @@ TEST_F(ShellSwitch, GoesToLocalBranchesOnly)
 {
     repository_.git({"tag", "v1"});
     for (const std::string name : {"nothing", "v1", "HEAD", "refs/heads/other", "other~0"})
-        EXPECT_THAT(refuse({"switch", name}), HasSubstr("cannot locate local branch '" + name));
-    EXPECT_THAT(refuse({"switch", head()}), HasSubstr("cannot locate local branch"));
+        EXPECT_THAT(refuse({"switch", name}), StartsWith("There is no branch '" + name + "'."));
+    EXPECT_EQ(refuse({"switch", "v1"}),
+              "There is no branch 'v1'. Use \"git switch --detach v1\".\n");
+    EXPECT_EQ(refuse({"switch", "othre"}), "There is no branch 'othre'. Did you mean 'other'?\n");
+    repository_.git({"update-ref", "refs/remotes/origin/topic", "main"});
+    EXPECT_EQ(refuse({"switch", "topic"}),
+              "There is no branch 'topic'. Make it from origin/topic with \"vclink-shell branch "
+              "topic origin/topic\".\n");
+}
+
+TEST_F(ShellSwitch, NamesUntrackedFilesInItsWay)
+{
+    repository_.git({"checkout", "--quiet", "other"});
+    repository_.write("fresh/file", "theirs\n");
+    repository_.commitAll("new");
+    repository_.git({"checkout", "--quiet", "main"});
+    repository_.write("fresh/file", "mine\n");
+    EXPECT_THAT(refuse({"switch", "other"}),
+                HasSubstr("and that branch has something in their place:\n  fresh/file\n"));
+    repository_.remove("fresh");
+    repository_.write("fresh", "mine\n");
+    EXPECT_THAT(refuse({"switch", "other"}), HasSubstr("in their place:\n  fresh\n"));
+}
+
+TEST_F(ShellSwitch, NamesTheMergeThatIsInItsWay)
+{
+    repository_.write("a", "ours\n");
+    repository_.commitAll("ours");
+    repository_.tryGit({"merge", "--quiet", "other"});
+    EXPECT_THAT(refuse({"switch", "other"}),
+                EndsWith("\nvclink-shell: A merge is under way. Conclude it with \"vclink-shell "
+                         "commit\", or undo it with \"git merge --abort\".\n"));
 }
 
 TEST_F(ShellSwitch, GoesToABranchWhateverItsName)
