@@ -116,7 +116,7 @@ TEST_F(ShellInterrupt, ComesTooLateOnceFilesAreWritten)
     ASSERT_TRUE(WIFEXITED(status)) << text;
     EXPECT_EQ(WEXITSTATUS(status), 0);
     EXPECT_THAT(text, AllOf(HasSubstr("Too late to cancel: files are being written.\n"),
-                            EndsWith(":/\nReverted 1000 files.\n")));
+                            EndsWith("-xp\nReverted 1000 files.\n")));
     EXPECT_EQ(countChanges(), 0U);
 }
 
@@ -148,7 +148,7 @@ TEST_F(ShellInterrupt, OfAnotherKindLetsTheProgramEndAsByItWhenItComesTooLate)
     ASSERT_TRUE(WIFEXITED(status)) << text;
     EXPECT_EQ(WEXITSTATUS(status), 143);
     EXPECT_THAT(text, AllOf(HasSubstr("Too late to cancel: files are being written.\n"),
-                            EndsWith(":/\nReverted 1000 files.\n")));
+                            EndsWith("-xp\nReverted 1000 files.\n")));
     EXPECT_EQ(countChanges(), 0U);
 }
 

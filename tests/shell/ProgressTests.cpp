@@ -128,7 +128,7 @@ TEST_F(ShellProgress, IsTakenAwayBeforeAFailureIsTold)
     EXPECT_THAT(result.errors, StartsWith(takeLineAway + "["));
     EXPECT_THAT(result.errors, HasSubstr(takeLineAway + "To restore what was discarded: "));
     EXPECT_THAT(result.errors,
-                HasSubstr(" :/\nvclink-shell: Git could not complete the operation: "));
+                HasSubstr(" -xp\nvclink-shell: Git could not complete the operation: "));
     EXPECT_EQ(repository_.read("b"), "edited\n");
 }
 
