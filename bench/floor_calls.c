@@ -6,6 +6,8 @@
 #include <stdlib.h>
 #include <string.h>
 
+#include <sys/resource.h>
+
 #include "bench/region.h"
 
 void fail(const char *what)
@@ -178,4 +180,7 @@ void measureShell(const char *command)
         fail(command);
     }
     printRegion(bytes);
+    struct rusage usage;
+    getrusage(RUSAGE_CHILDREN, &usage);
+    printf("child_peak_kib %ld\n", usage.ru_maxrss);
 }
