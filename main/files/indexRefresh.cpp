@@ -165,11 +165,10 @@ void markSavedSince(git_repository *repository, git_index *index)
                              !isOfTime(*entry, ofFile.st_mtim);
         if (isSaved)
         {
-            // As git and libgit2 mark a file to be compared by its content.
-            git_index_entry marked = *entry;
-            marked.path = path.c_str() + rootSize;
-            marked.file_size = 0;
-            check(git_index_add, index, &marked);
+            // As git and libgit2 mark a file to be compared by its content. git_index_add would
+            // also remove entries that collide with this one, as `a` and `a/b` do. libgit2 declares
+            // its entries read-only, but its order and look-ups do not use the size.
+            const_cast<git_index_entry *>(entry)->file_size = 0;
         }
     }
 }
