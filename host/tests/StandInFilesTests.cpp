@@ -49,7 +49,7 @@ class StandInFiles : public testing::Test
         return closed;
     }
 
-    const vclink_host_tests::Folder folder;
+    const vclink_host_tests::Folder folder{};
     const ustring where = utf8_to_ustring(folder.path().string());
 };
 

@@ -150,25 +150,4 @@ TEST_F(DifferencesFromGit, AFileThatTookTheirFoldersPlaceIsInTheWayOfARevert)
     EXPECT_EQ(statusOf(repository), "");
 }
 
-// git takes the folder's files out of the index. libgit2 does that for what the list's pattern
-// matches, and a name that has to be escaped is a pattern for itself alone. A commit mends it.
-TEST_F(DifferencesFromGit, AFileWithAnEscapedNameIsStagedBesideTheFolderThatItReplaces)
-{
-    auto repository = makeRepository();
-    repository.write("#folder/file", "x");
-    repository.write(" first", "x");
-    repository.commitAll("first");
-    repository.git({"config", "user.name", "Somebody"});
-    repository.git({"config", "user.email", "somebody@example.com"});
-    repository.remove("#folder");
-    repository.write("#folder", "instead");
-    const auto adapter = makeAdapter(repository);
-    adapter->markResolved(asPath(repository / "#folder"));
-    EXPECT_EQ(repository.git({"ls-files"}), " first\n#folder\n#folder/file\n");
-    adapter->commit(upath(), u"second");
-    EXPECT_EQ(repository.git({"ls-files"}), " first\n#folder\n");
-    EXPECT_EQ(statusOf(repository), "");
-    EXPECT_TRUE(repository.tryGit({"fsck", "--strict"}).succeeded());
-}
-
 } // namespace

@@ -18,7 +18,7 @@ TEST_F(ShellChangeFailures, AreToldInTheLanguageThatWasAskedFor)
 {
     makeConflict();
     succeed({"rm", "b"});
-    const std::string file = (repository_ / "a").string() + '\n';
+    const std::string file = "  a\n";
     const struct
     {
         std::vector<std::string> arguments;

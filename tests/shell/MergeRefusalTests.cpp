@@ -159,7 +159,8 @@ TEST_F(ShellMergeOverChanges, DoesNothingWhenThereIsNothingToDo)
 TEST_F(ShellMergeOverChanges, FailsInTheWordsOfTheBackEndWhereItCannotBegin)
 {
     repository_.write("a", "edited\n");
-    EXPECT_THAT(refuse({"merge", "nothing"}), StartsWith("\"nothing\" could not be merged"));
+    EXPECT_THAT(refuse({"merge", "nothing"}),
+                StartsWith("Nothing was merged: there is no branch and no commit 'nothing'.\n"));
     repository_.git({"checkout", "--quiet", "a"});
     clash();
     fail({"merge", "other"});
