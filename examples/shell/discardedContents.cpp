@@ -34,8 +34,8 @@ struct OnDisk
 {
     /// files, links, and folders that are in the place of a file, each relative to the root
     std::set<std::string> names;
-    /// whether a folder comes back in the place of a file
-    bool becomesFolder = false;
+    /// those in whose place a folder comes back
+    std::set<std::string> placesOfFolders;
     /// what there can be no copy of, and why
     std::map<std::string, std::string> obstacles;
 };
@@ -92,7 +92,10 @@ void collectInPlace(const fs::path &root, const std::string &name, OnDisk &found
         const fs::file_status status = fs::symlink_status(root / place, error);
         if (fs::status_known(status) && !fs::is_directory(status))
         {
-            found.becomesFolder = found.becomesFolder || (fs::exists(status) && place != name);
+            if (fs::exists(status) && place != name)
+            {
+                found.placesOfFolders.insert(place.string());
+            }
             collectFile(root, place, found);
             return;
         }
@@ -267,10 +270,15 @@ WayBack keep(Session &session, const std::vector<NamedPath> &paths, const FileSt
     if (!onDisk.names.empty())
     {
         const std::string archive = storeArchive(root, {onDisk.names.begin(), onDisk.names.end()});
-        wayBack.files = say(
-            "To restore what was discarded: %1%",
-            fill("git %1%cat-file blob %2% | tar %1%%3%-xp",
-                 {folder, shorten(archive), onDisk.becomesFolder ? "--recursive-unlink " : ""}));
+        // tar could remove them, with all that is put into them until then.
+        for (const std::string &name : onDisk.placesOfFolders)
+        {
+            wayBack.files += say("Before you restore, move the folder '%1%' out of the way.\n",
+                                 showPath(makePath(root / name)));
+        }
+        wayBack.files +=
+            say("To restore what was discarded: %1%",
+                fill("git %1%cat-file blob %2% | tar %1%-xp", {folder, shorten(archive)}));
     }
     std::vector<StagedChange> staged = index.changes();
     staged.erase(std::remove_if(staged.begin(), staged.end(),

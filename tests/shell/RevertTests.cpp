@@ -39,6 +39,12 @@ class ShellRevert : public ChangeFixture
     {
         for (const std::string &line : split(errors, '\n'))
         {
+            if (line.rfind("Before you restore, ", 0) == 0)
+            {
+                const std::string folder = split(line, '\'')[1];
+                std::filesystem::rename(place / folder, place / (folder + ".moved"));
+                continue;
+            }
             const std::string command = "set -o pipefail; " + line.substr(line.find(": git ") + 2);
             const CommandResult result = Command({"bash", "-c", command}).in(place).run();
             EXPECT_EQ(result.exitStatus, 0) << line << '\n' << result.errors;
@@ -171,8 +177,13 @@ TEST_F(ShellRevert, KeepsWhatIsInThePlaceOfAFile)
     repository_.write("folder", "a file\n");
     const std::string line = runIn(repository_.path(), {"revert", "."}).errors;
     EXPECT_EQ(repository_.read("a") + repository_.read("folder/c"), "a\nfolder/c\n");
+    repository_.write("folder/later", "later\n");
+    const std::string command = split(line, '\n').back();
+    restore("x: " + command.substr(command.find(": git ") + 2) + " || true", repository_.path());
+    EXPECT_EQ(repository_.read("folder/later"), "later\n");
     restore(line, repository_.path());
     EXPECT_EQ(repository_.read("a/notes") + repository_.read("folder"), "notes\na file\n");
+    EXPECT_EQ(repository_.read("folder.moved/later"), "later\n");
 }
 
 TEST_F(ShellRevert, KeepsTheBytesOfTheDiskThatFiltersChange)
