@@ -17,7 +17,7 @@ namespace
 class FileOperations : public testing::Test
 {
   protected:
-    const vclink_host_tests::Folder folder;
+    const vclink_host_tests::Folder folder{};
 };
 
 TEST_F(FileOperations, TellWhetherSomethingExistsAndRemoveAFile)

@@ -24,7 +24,7 @@ class FileStreams : public testing::Test
         return {std::istreambuf_iterator<char>(stream), std::istreambuf_iterator<char>()};
     }
 
-    const vclink_host_tests::Folder folder;
+    const vclink_host_tests::Folder folder{};
 };
 
 TEST_F(FileStreams, WriteAndReadEveryByteUnderAnyName)

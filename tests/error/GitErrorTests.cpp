@@ -30,7 +30,7 @@ static_assert(std::is_constructible_v<GitError, int>);
 
 class GitErrorTest : public testing::Test
 {
-    const test::HermeticLibGit2 libgit2_;
+    const test::HermeticLibGit2 libgit2_{};
 };
 
 TEST_F(GitErrorTest, TakesClassAndMessageOfTheRecordForEachCodeButThatOfASuccess)

@@ -101,7 +101,7 @@ void expectBadAccess(Action action, const std::string &text, const std::string &
 
 class GitResultTest : public testing::Test
 {
-    const test::HermeticLibGit2 libgit2_;
+    const test::HermeticLibGit2 libgit2_{};
 };
 using GitCheck = GitResultTest;
 using GitErrorPolicyTest = GitResultTest;

@@ -36,7 +36,7 @@ class LibGit2ExceptionTest : public testing::Test
     }
 
   private:
-    const test::HermeticLibGit2 libgit2_;
+    const test::HermeticLibGit2 libgit2_{};
 };
 
 TEST_F(LibGit2ExceptionTest, TellsCodeClassAndMessageWithoutAnAddedText)
