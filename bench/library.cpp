@@ -51,7 +51,7 @@ void measureProbe(const upath &folder, bool holdGuard)
 /// Compares neighbours, as an insertion at the end of a map does. The entries are the comparisons.
 void measureLess(const std::vector<upath> &paths)
 {
-    const std::less<upath> less;
+    const FileStateMap::key_compare less;
     std::size_t comparisons = 0;
     std::size_t ascending = 0;
     beginRegion();

@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
-#include <stddef.h>
+#include <stddef.h> // NOLINT(modernize-deprecated-headers): C includes this header too
 
 #ifdef __cplusplus
 extern "C"

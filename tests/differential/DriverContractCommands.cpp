@@ -60,7 +60,7 @@ DriverCase refuses(const std::string &name, const std::string &end)
 DriverCase refusesAll(const std::string &name, const std::string &end)
 {
     DriverCase result = refuses(name, end);
-    if (gitRelease::driverCanEndMerge())
+    if (git_release::driverCanEndMerge())
     {
         result.expectation = {Kind::GitGivesUpAConflict, "ours\n", conflictMarkers};
     }
@@ -146,7 +146,7 @@ std::vector<DriverCase> commandCases()
         commands("IsNotExecutable", "/etc/hostname %A", notStarted),
         commands("IsAFolder", "/ %A", notStarted),
         commands("IsNotClosed", "true \"", notStarted),
-        commands("IsEmpty", "", gitRelease::emptyDriverEndsMerge() ? noneStarted : notStarted),
+        commands("IsEmpty", "", git_release::emptyDriverEndsMerge() ? noneStarted : notStarted),
         commands("IsBlank", "  ", notStarted),
     };
 }

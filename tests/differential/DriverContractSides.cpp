@@ -190,6 +190,18 @@ std::vector<DriverCase> sideCases()
     };
 }
 
+DriverCase inAnIncludedFile()
+{
+    return configured("InAnIncludedFile",
+                      [](const GitRepository &repository, const HermeticEnvironment &environment,
+                         const std::string &command)
+                      {
+                          const auto included = environment.home() / "included";
+                          defineIn(repository, included, command);
+                          repository.git({"config", "include.path", included.string()});
+                      });
+}
+
 std::vector<DriverCase> configurationCases()
 {
     using Environment = HermeticEnvironment;
@@ -211,14 +223,7 @@ std::vector<DriverCase> configurationCases()
         definedIn("InTheRepositoryBeforeTheGlobalFile", {".gitconfig", ""}),
         definedIn("InTheRepositoryBeforeTheXdgFile", {".config/git/config", ""}),
         definedIn("InTheGlobalBeforeTheXdgFile", {".config/git/config", ".gitconfig"}),
-        configured("InAnIncludedFile",
-                   [](const GitRepository &repository, const Environment &environment,
-                      const std::string &command)
-                   {
-                       const auto included = environment.home() / "included";
-                       defineIn(repository, included, command);
-                       repository.git({"config", "include.path", included.string()});
-                   }),
+        inAnIncludedFile(),
         configured(
             "TwiceInOneFile",
             [](const GitRepository &repository, const Environment &, const std::string &command)

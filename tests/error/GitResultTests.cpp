@@ -141,7 +141,7 @@ TEST_F(GitResultTest, OfACallHasItsOwnTextAndNoEarlierOne)
 {
     git_error_set_str(GIT_ERROR_CONFIG, "stale");
     EXPECT_TRUE(call(answerWith, 0, none).has_value());
-    EXPECT_TRUE(test::libgit2Release::isSilent());
+    EXPECT_TRUE(test::libgit2_release::isSilent());
     git_error_set_str(GIT_ERROR_CONFIG, "stale");
     const GitResult<void> silent = call(answerWith, -5, none);
     ASSERT_TRUE(silent.has_error());

@@ -149,7 +149,7 @@ TEST_F(EarlierTexts, AreGoneBeforeEachCallThatCanLeaveOne)
     {
         const bool canLeaveOne =
             calls_.calls().back().givesCode && functionsWithoutText.count(name) == 0;
-        EXPECT_TRUE(!canLeaveOne || libgit2Release::isSilent()) << name;
+        EXPECT_TRUE(!canLeaveOne || libgit2_release::isSilent()) << name;
     };
     EXPECT_TRUE(git::GitAdapterFactory().isAdapterFor(asPath(repository_.path())));
     adapter_->getFileStates({file});

@@ -68,7 +68,7 @@ TEST_F(GitAdapterFactoryTest, LetsTheFirstOperationRaiseForAFolderThatIsNoReposi
         EXPECT_EQ(exception.getError().getErrorClass(), GIT_ERROR_REPOSITORY);
         const std::string own = asUtf8(exception.getError().getMessage());
         EXPECT_EQ(own, "could not find repository " +
-                           std::string(libgit2Release::whereNoRepositoryIs) + " '" +
+                           std::string(libgit2_release::whereNoRepositoryIs) + " '" +
                            environment().home().string() + "'");
         const std::string text = asUtf8(exception.GetUnicodeMessageTxt());
         EXPECT_NE(text.find(own), std::string::npos) << text;

@@ -45,7 +45,7 @@ class Memory : public vclink::test::RemoteFixture
     {
         const std::size_t limit = 1024;
         const std::size_t left = bytesLeftBy(operation);
-        EXPECT_EQ(left > limit, vclink::test::libgit2Release::losesMemory) << left << " bytes";
+        EXPECT_EQ(left > limit, vclink::test::libgit2_release::losesMemory) << left << " bytes";
     }
 };
 

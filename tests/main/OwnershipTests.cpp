@@ -16,7 +16,7 @@ namespace
 
 using vclink::git::LibGit2Exception;
 using vclink::test::asPath;
-namespace libgit2Release = vclink::test::libgit2Release;
+namespace libgit2_release = vclink::test::libgit2_release;
 
 /// A repository of whoever runs the tests, met by the unprivileged user, who is another one where
 /// the tests run as root.
@@ -60,7 +60,7 @@ class Ownership : public vclink::test::AdapterFixture
     std::string notOwned() const
     {
         return "-36 7 repository path '" + repository_.path().string() +
-               std::string(libgit2Release::endOfOwnedPath) + "' is not owned by current user";
+               std::string(libgit2_release::endOfOwnedPath) + "' is not owned by current user";
     }
     static std::string unlessOwn(const std::string &refused)
     {
@@ -73,7 +73,7 @@ class Ownership : public vclink::test::AdapterFixture
 TEST_F(Ownership, OfAnotherUserRefusesTheFirstOperation)
 {
     EXPECT_EQ(openedByTheOther(),
-              unlessOwn(libgit2Release::needsNoSafeDirectory
+              unlessOwn(libgit2_release::needsNoSafeDirectory
                             ? notOwned()
                             : "-3 7 config value 'safe.directory' was not found"));
 }
@@ -94,7 +94,7 @@ TEST_F(Ownership, OfAnotherUserDoesNotMatterForATrustedFolder)
 TEST_F(Ownership, OfAnotherUserIsTrustedByAStarWhereLibGit2Knows)
 {
     trust("*");
-    EXPECT_EQ(openedByTheOther(), libgit2Release::trustsStar ? "1 states" : unlessOwn(notOwned()));
+    EXPECT_EQ(openedByTheOther(), libgit2_release::trustsStar ? "1 states" : unlessOwn(notOwned()));
 }
 
 /// A probe looks at the layout only.

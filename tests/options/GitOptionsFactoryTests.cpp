@@ -75,10 +75,10 @@ TEST(GitOptionsFactory, GivesTheSameValuesInBothClasses)
         const CloneOptions clone = factory->makeCloneOptions();
         EXPECT_FALSE(clone.bare);
         EXPECT_FALSE(clone.checkoutBranch.has_value());
-        EXPECT_EQ(clone.checkoutOptions.checkoutStrategy, test::libgit2Release::safeCheckout);
+        EXPECT_EQ(clone.checkoutOptions.checkoutStrategy, test::libgit2_release::safeCheckout);
         EXPECT_EQ(factory->makePushOptions().packbuilderParallelism, 1u);
         EXPECT_EQ(factory->makeCheckoutOptions().checkoutStrategy,
-                  test::libgit2Release::safeCheckout);
+                  test::libgit2_release::safeCheckout);
         // These have no fields that could differ.
         EXPECT_NO_THROW(factory->makeFetchOptions());
         EXPECT_NO_THROW(factory->makeProxyOptions());

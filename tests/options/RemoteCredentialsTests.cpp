@@ -92,7 +92,7 @@ TEST_F(RemoteCredentials, AreNoneWhereNoSshKeyIsTaken)
         EXPECT_EQ(answer.credential, nullptr) << types;
     }
     EXPECT_EQ(ask("ssh://host/path", nullptr, GIT_CREDENTIAL_USERNAME).code, -1);
-    EXPECT_TRUE(test::libgit2Release::isSilent()) << "libgit2 was asked";
+    EXPECT_TRUE(test::libgit2_release::isSilent()) << "libgit2 was asked";
 }
 
 TEST_F(RemoteCredentials, AreThoseOfLibGit2sAnswerWhereThereIsNoUser)
@@ -101,7 +101,7 @@ TEST_F(RemoteCredentials, AreThoseOfLibGit2sAnswerWhereThereIsNoUser)
     EXPECT_EQ(answer.code, git_credential_ssh_key_from_agent(nullptr, nullptr));
     EXPECT_LT(answer.code, 0);
     EXPECT_EQ(answer.credential, nullptr);
-    ASSERT_FALSE(test::libgit2Release::isSilent());
+    ASSERT_FALSE(test::libgit2_release::isSilent());
 }
 
 TEST_F(RemoteCredentials, TellTheirRequestInOneRecord)
@@ -142,11 +142,11 @@ TEST_F(RemoteCredentials, ThatAreRefusedLeaveNoTextOfAnEarlierCall)
     {
         git_error_set_str(GIT_ERROR_CONFIG, "config value 'http.followRedirects' was not found");
         EXPECT_EQ(ask("https://host/path", "git", types).code, -1);
-        EXPECT_TRUE(test::libgit2Release::isSilent()) << types;
+        EXPECT_TRUE(test::libgit2_release::isSilent()) << types;
     }
     git_error_set_str(GIT_ERROR_CONFIG, "config value 'http.followRedirects' was not found");
     expectAgent(ask("ssh://git@host/path", "git", sshKey), "git");
-    EXPECT_TRUE(test::libgit2Release::isSilent());
+    EXPECT_TRUE(test::libgit2_release::isSilent());
 }
 
 TEST_F(RemoteCredentials, ThatAreRefusedLeaveNoExceptionBehind)

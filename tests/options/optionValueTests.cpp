@@ -46,7 +46,7 @@ static_assert(std::is_same_v<decltype(CloneOptions::fetchOptions), FetchOptions>
 
 TEST(CheckoutOptions, BeginSafe)
 {
-    EXPECT_EQ(CheckoutOptions().checkoutStrategy, test::libgit2Release::safeCheckout);
+    EXPECT_EQ(CheckoutOptions().checkoutStrategy, test::libgit2_release::safeCheckout);
     EXPECT_EQ(CheckoutOptions().checkoutStrategy, std::uint64_t{GIT_CHECKOUT_SAFE});
 }
 

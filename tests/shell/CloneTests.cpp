@@ -151,7 +151,7 @@ TEST_F(ShellClone, TellsWhyThereIsNothingToClone)
     EXPECT_THAT(fail("nothing"), HasSubstr("could not find repository"));
     EXPECT_THAT(fail("nowhere"), HasSubstr("nowhere can't be found"));
     EXPECT_THAT(fail("strange://host/path"),
-                HasSubstr(libgit2Release::refusalOfScheme("strange://host/path")));
+                HasSubstr(libgit2_release::refusalOfScheme("strange://host/path")));
     EXPECT_THAT(fail(daemon().base() + "/missing.git"), HasSubstr("no such repository"));
     const std::string silent = std::to_string(freePorts(1).front());
     EXPECT_THAT(fail("git://127.0.0.1:" + silent + "/a.git"), HasSubstr("Connection refused"));

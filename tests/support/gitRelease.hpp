@@ -7,7 +7,7 @@
 
 /// Differences between releases of git that a test depends on, a line each; libgit2Release.hpp has
 /// those of libgit2. The release is that of the git that the tests run.
-namespace vclink::test::gitRelease
+namespace vclink::test::git_release
 {
 
 inline bool isSince(int major, int minor)
@@ -35,4 +35,4 @@ inline bool emptyDriverEndsMerge()
     return !isSince(2, 42);
 }
 
-} // namespace vclink::test::gitRelease
+} // namespace vclink::test::git_release

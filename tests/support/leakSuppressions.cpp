@@ -10,6 +10,6 @@ leakSuppressions() __asm__("__lsan_default_suppressions");
 
 extern "C" const char *leakSuppressions()
 {
-    return vclink::test::libgit2Release::losesMemory ? "leak:libpcre2-8\nleak:libssh2\n"
-                                                     : "leak:libssh2\n";
+    return vclink::test::libgit2_release::losesMemory ? "leak:libpcre2-8\nleak:libssh2\n"
+                                                      : "leak:libssh2\n";
 }

@@ -11,7 +11,7 @@
 /// What the releases of libgit2 do differently and a test binds, a line each. Tests read it here
 /// and have no conditions on a release of their own. Tried are 1.5 and 1.9: where nothing tells
 /// which release between them brought a difference, it counts as 1.9's.
-namespace vclink::test::libgit2Release
+namespace vclink::test::libgit2_release
 {
 
 constexpr bool isSince(int major, int minor)
@@ -68,4 +68,4 @@ inline bool isSilent()
                                  std::string_view(record->message) == "no error");
 }
 
-} // namespace vclink::test::libgit2Release
+} // namespace vclink::test::libgit2_release

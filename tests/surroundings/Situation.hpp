@@ -14,10 +14,10 @@ namespace vclink::test
 /// What a place holds in the commit that a situation begins with.
 enum class Holds
 {
-    nothing,
-    file,
-    folder,
-    submodule
+    Nothing,
+    File,
+    Folder,
+    Submodule
 };
 
 /// Where an obstacle stands, and what the other branch does there.

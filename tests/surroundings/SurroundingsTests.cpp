@@ -112,28 +112,28 @@ INSTANTIATE_TEST_SUITE_P(Operations, BranchSurroundings, testing::ValuesIn(opera
 
 enum class Listed
 {
-    otherFile,
-    obstacle,
-    obstacleAndSibling
+    OtherFile,
+    Obstacle,
+    ObstacleAndSibling
 };
 
 class RevertSurroundings : public testing::WithParamInterface<Listed>, public FileSurroundings
 {
   protected:
-    RevertSurroundings() : FileSurroundings(GetParam() == Listed::obstacleAndSibling)
+    RevertSurroundings() : FileSurroundings(GetParam() == Listed::ObstacleAndSibling)
     {
     }
     /// What a revert names in a place: a folder, by a file below it.
     static std::string nameIn(const Place &place)
     {
-        return place.holds == Holds::folder ? place.path + "/file" : place.path;
+        return place.holds == Holds::Folder ? place.path + "/file" : place.path;
     }
 };
 
 TEST_P(RevertSurroundings, LoseNothingThatGitKeepsAndOtherwiseDifferByRuleOnly)
 {
-    const bool isListed = GetParam() != Listed::otherFile;
-    const bool hasSiblings = GetParam() == Listed::obstacleAndSibling;
+    const bool isListed = GetParam() != Listed::OtherFile;
+    const bool hasSiblings = GetParam() == Listed::ObstacleAndSibling;
     const std::string operation = isListed ? "revert" : "revert of another file";
     go("main");
     for (const auto &place : vclink::test::allPlaces())
@@ -152,7 +152,7 @@ TEST_P(RevertSurroundings, LoseNothingThatGitKeepsAndOtherwiseDifferByRuleOnly)
             {
                 names.push_back(nameIn(place));
                 // git refuses names of what is in no commit and not in the index.
-                if (place.holds != Holds::nothing || obstacle.name.find("staged") == 0)
+                if (place.holds != Holds::Nothing || obstacle.name.find("staged") == 0)
                     byGit.push_back(nameIn(place));
             }
             const std::string sibling = vclink::test::siblingOf(place.path);
@@ -189,12 +189,12 @@ TEST_P(RevertSurroundings, LoseNothingThatGitKeepsAndOtherwiseDifferByRuleOnly)
 }
 
 INSTANTIATE_TEST_SUITE_P(Lists, RevertSurroundings,
-                         testing::Values(Listed::obstacle, Listed::otherFile,
-                                         Listed::obstacleAndSibling),
+                         testing::Values(Listed::Obstacle, Listed::OtherFile,
+                                         Listed::ObstacleAndSibling),
                          [](const auto &instance)
                          {
-                             const bool isListed = instance.param != Listed::otherFile;
-                             const bool hasSiblings = instance.param == Listed::obstacleAndSibling;
+                             const bool isListed = instance.param != Listed::OtherFile;
+                             const bool hasSiblings = instance.param == Listed::ObstacleAndSibling;
                              return hasSiblings ? "OfWhatIsInTheWayAndSiblings"
                                     : isListed  ? "OfWhatIsInTheWay"
                                                 : "OfAnotherFile";

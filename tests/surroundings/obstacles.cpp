@@ -225,9 +225,9 @@ const std::vector<Obstacle> &allObstacles()
     constexpr bool mayBlock = true;
     constexpr bool common = true;
     constexpr bool rare = false;
-    constexpr auto nothing = Holds::nothing;
-    constexpr auto file = Holds::file;
-    constexpr auto folder = Holds::folder;
+    constexpr auto nothing = Holds::Nothing;
+    constexpr auto file = Holds::File;
+    constexpr auto folder = Holds::Folder;
     static const std::vector<Obstacle> obstacles{
         {"untracked file", nothing, common, write},
         {"ignored file", nothing, common, ignored(write)},

@@ -142,8 +142,8 @@ const std::vector<Obstacle> &submoduleObstacles()
     constexpr bool mayBlock = true;
     constexpr bool common = true;
     constexpr bool rare = false;
-    constexpr auto nothing = Holds::nothing;
-    constexpr auto submodule = Holds::submodule;
+    constexpr auto nothing = Holds::Nothing;
+    constexpr auto submodule = Holds::Submodule;
     static const std::vector<Obstacle> obstacles{
         {"clean submodule", submodule, common, leaveAsItIs},
         {"embedded repository", submodule, rare, embed},

@@ -125,7 +125,7 @@ const std::vector<Place> &submodulePlaces()
 {
     constexpr bool common = true;
     constexpr bool rare = false;
-    constexpr auto submodule = Holds::submodule;
+    constexpr auto submodule = Holds::Submodule;
     static const std::vector<Place> places{
         {"a moved submodule", submodule, common, "s", "moves"},
         {"a removed submodule", submodule, common, "s", "removes"},
@@ -134,13 +134,13 @@ const std::vector<Place> &submodulePlaces()
         {"a submodule that becomes a file", submodule, common, "s", "files", emptyIt},
         {"a submodule that becomes a folder", submodule, common, "s", "folders", emptyIt},
         {"a submodule left alone", submodule, common, "s", "unrelated"},
-        {"a new submodule", Holds::nothing, common, "new", "adds"},
-        {"a new submodule below a tracked folder", Holds::nothing, rare, "t/new", "adds"},
-        {"a new submodule below an untracked folder", Holds::nothing, rare, "u/new", "adds"},
-        {"a file that becomes a submodule", Holds::file, common, "file", "takes"},
-        {"in a folder that becomes a submodule", Holds::file, rare, "d/file", "takes"},
-        {"new in a folder that becomes a submodule", Holds::nothing, common, "d/new", "takes"},
-        {"a folder that becomes a submodule", Holds::folder, common, "d", "takes"},
+        {"a new submodule", Holds::Nothing, common, "new", "adds"},
+        {"a new submodule below a tracked folder", Holds::Nothing, rare, "t/new", "adds"},
+        {"a new submodule below an untracked folder", Holds::Nothing, rare, "u/new", "adds"},
+        {"a file that becomes a submodule", Holds::File, common, "file", "takes"},
+        {"in a folder that becomes a submodule", Holds::File, rare, "d/file", "takes"},
+        {"new in a folder that becomes a submodule", Holds::Nothing, common, "d/new", "takes"},
+        {"a folder that becomes a submodule", Holds::Folder, common, "d", "takes"},
     };
     return places;
 }
@@ -148,7 +148,7 @@ const std::vector<Place> &submodulePlaces()
 const std::vector<Place> &addedSubmodulePlaces()
 {
     constexpr bool common = true;
-    constexpr auto submodule = Holds::submodule;
+    constexpr auto submodule = Holds::Submodule;
     static const std::vector<Place> places{
         {"a submodule that both added", submodule, common, "new", "adds"},
         {"a submodule that both added with other commits", submodule, common, "new",
@@ -162,7 +162,7 @@ const std::vector<Place> &addedSubmodulePlaces()
 const std::vector<Place> &movedSubmodulePlaces()
 {
     constexpr bool common = true;
-    constexpr auto submodule = Holds::submodule;
+    constexpr auto submodule = Holds::Submodule;
     static const std::vector<Place> places{
         {"a submodule that both moved", submodule, common, "s", "moves"},
         {"a submodule that both moved alike", submodule, common, "s", "moves-alike"},
@@ -179,7 +179,7 @@ const std::vector<Place> &removedSubmodulePlaces()
 {
     constexpr bool common = true;
     constexpr bool rare = false;
-    constexpr auto nothing = Holds::nothing;
+    constexpr auto nothing = Holds::Nothing;
     static const std::vector<Place> places{
         {"a submodule that both removed", nothing, common, "s", "removes"},
         {"a submodule that both removed below a folder", nothing, rare, "t/s", "removes"},
@@ -195,7 +195,7 @@ const std::vector<Place> &removedSubmodulePlaces()
 const std::vector<Place> &replacedSubmodulePlaces()
 {
     constexpr bool common = true;
-    constexpr auto file = Holds::file;
+    constexpr auto file = Holds::File;
     static const std::vector<Place> places{
         {"a submodule that both made a file", file, common, "s", "files"},
         {"a submodule that they made a folder", file, common, "s", "folders"},
@@ -211,17 +211,17 @@ const std::vector<Place> &unfoldedSubmodulePlaces()
     constexpr bool common = true;
     constexpr bool rare = false;
     static const std::vector<Place> places{
-        {"a submodule that both made a folder", Holds::folder, common, "s", "folders"},
-        {"below a submodule that both made a folder", Holds::file, rare, "s/inner", "folders"},
-        {"a submodule that they made a file", Holds::folder, common, "s", "files"},
-        {"a submodule that they moved", Holds::folder, common, "s", "moves"},
-        {"below a submodule that they moved", Holds::file, rare, "s/inner", "moves"},
-        {"a submodule that they removed", Holds::folder, common, "s", "removes"},
-        {"below a submodule that they removed", Holds::file, rare, "s/inner", "removes"},
-        {"a submodule that they renamed", Holds::folder, common, "s", "renames"},
-        {"a submodule that ours made a folder", Holds::folder, common, "s", "unrelated"},
-        {"below a submodule that ours made a folder", Holds::file, common, "s/inner", "unrelated"},
-        {"new below a submodule that ours made a folder", Holds::nothing, common, "s/new",
+        {"a submodule that both made a folder", Holds::Folder, common, "s", "folders"},
+        {"below a submodule that both made a folder", Holds::File, rare, "s/inner", "folders"},
+        {"a submodule that they made a file", Holds::Folder, common, "s", "files"},
+        {"a submodule that they moved", Holds::Folder, common, "s", "moves"},
+        {"below a submodule that they moved", Holds::File, rare, "s/inner", "moves"},
+        {"a submodule that they removed", Holds::Folder, common, "s", "removes"},
+        {"below a submodule that they removed", Holds::File, rare, "s/inner", "removes"},
+        {"a submodule that they renamed", Holds::Folder, common, "s", "renames"},
+        {"a submodule that ours made a folder", Holds::Folder, common, "s", "unrelated"},
+        {"below a submodule that ours made a folder", Holds::File, common, "s/inner", "unrelated"},
+        {"new below a submodule that ours made a folder", Holds::Nothing, common, "s/new",
          "unrelated"},
     };
     return places;

@@ -29,7 +29,7 @@ using vclink::test::LogCapture;
 using vclink::test::makeSshKey;
 using vclink::test::SshAgent;
 using vclink::test::SshServer;
-namespace libgit2Release = vclink::test::libgit2Release;
+namespace libgit2_release = vclink::test::libgit2_release;
 
 /// Has the server of the suite running before the test's environment is made.
 class RunningSshServer
@@ -93,7 +93,7 @@ class SshCredentials : public RunningSshServer, public vclink::test::RemoteFixtu
     {
         EXPECT_EQ(failure.code, GIT_EAUTH);
         EXPECT_EQ(failure.errorClass, GIT_ERROR_SSH);
-        EXPECT_THAT(failure.text, HasSubstr(std::string(libgit2Release::endOfSshTries)));
+        EXPECT_THAT(failure.text, HasSubstr(std::string(libgit2_release::endOfSshTries)));
         EXPECT_GE(requests_, 1);
         EXPECT_LE(requests_, 7);
     }
@@ -101,7 +101,7 @@ class SshCredentials : public RunningSshServer, public vclink::test::RemoteFixtu
     void expectMissingAgent(const std::string &reason)
     {
         const auto failure = refusalOf(url_);
-        if (!libgit2Release::tellsOfMissingAgent)
+        if (!libgit2_release::tellsOfMissingAgent)
         {
             expectHangUp(failure);
             return;

@@ -96,7 +96,7 @@ std::string searchAsBoost(const std::string &name, const std::vector<std::string
     }
     for (const std::string &folder : folders)
     {
-        const std::string candidate = folder + '/' + name;
+        std::string candidate = folder + '/' + name;
         if (::access(candidate.c_str(), X_OK) == 0)
         {
             return candidate;

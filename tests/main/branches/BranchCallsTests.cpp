@@ -74,7 +74,7 @@ TEST_F(CallsOnBranches, OfASwitchAreTheseInOrderWithTheRecordOfASafeCheckout)
                 endOfTheLook_,
                 {"git_object_free", "git_reference_free", "git_repository_free"}}));
     ASSERT_THAT(checkouts_, SizeIs(1));
-    expectCheckoutRecord(checkouts_[0], libgit2Release::safeCheckout);
+    expectCheckoutRecord(checkouts_[0], libgit2_release::safeCheckout);
     EXPECT_THAT(checkoutPaths_[0], IsEmpty());
 }
 
@@ -128,7 +128,7 @@ TEST_F(CallsOfAMerge, OfAFastForwardAreTheseInOrder)
                       {"git_object_free", "git_reference_free", "git_annotated_commit_free",
                        "git_repository_free"}}));
     ASSERT_THAT(checkouts_, SizeIs(1));
-    expectCheckoutRecord(checkouts_[0], libgit2Release::safeCheckout);
+    expectCheckoutRecord(checkouts_[0], libgit2_release::safeCheckout);
     EXPECT_THAT(checkoutPaths_[0], IsEmpty());
 }
 

@@ -9,19 +9,16 @@
 
 #include "main/branches/SwitchBranchFixture.hpp"
 #include "support/text.hpp"
-#include "vclink/util/exception/CancelledOperationException.hpp"
 
 namespace
 {
 
 namespace fs = std::filesystem;
-using testing::ElementsAre;
 using testing::HasSubstr;
 using testing::IsEmpty;
 using vclink::test::Failure;
 using vclink::test::NothingChanges;
 using vclink::test::stateOf;
-using vclink::util::exception::CancelledOperationException;
 
 /// "main" with the folder "dir", of which the test makes a link to a folder outside that holds the
 /// same names, and branches that change it.

@@ -30,7 +30,7 @@ const Failure angleBrackets{GIT_ERROR, GIT_ERROR_INVALID,
                             "failed to parse signature - Neither `name` nor `email` should contain "
                             "angle brackets chars."};
 
-const std::string noise(libgit2Release::noiseOfNames);
+const std::string noise(libgit2_release::noiseOfNames);
 
 std::string hostName()
 {

@@ -274,7 +274,7 @@ TEST_F(StatusRecord, HasTheseFieldsAndHoldsOtherwiseWhatLibGit2Initialises)
     EXPECT_EQ(options.baseline, nullptr);
     EXPECT_TRUE(walks_[0].hasCallback);
     EXPECT_TRUE(walks_[0].hasPayload);
-    if (libgit2Release::setsRenameThreshold)
+    if (libgit2_release::setsRenameThreshold)
     {
         EXPECT_EQ(options.rename_threshold, initialised.rename_threshold);
     }

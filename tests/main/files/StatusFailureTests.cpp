@@ -71,11 +71,11 @@ TEST_F(StatusFailure, OfAFormatThatLibGit2DoesNotKnowIsRaised)
     EXPECT_EQ(raisedBy(*makeAdapter(repository_.path())), GIT_ERROR);
     const auto sha256 = folder() / "sha256";
     repository_.git({"init", "--quiet", "--object-format=sha256", sha256.string()});
-    EXPECT_EQ(raisedBy(*makeAdapter(sha256)), libgit2Release::refusalOfSha256);
+    EXPECT_EQ(raisedBy(*makeAdapter(sha256)), libgit2_release::refusalOfSha256);
     const auto extended = makeRepository("extended");
     extended.git({"config", "core.repositoryFormatVersion", "1"});
     extended.git({"config", "extensions.worktreeConfig", "true"});
-    EXPECT_EQ(raisedBy(*makeAdapter(extended.path())), libgit2Release::refusalOfWorktreeConfig);
+    EXPECT_EQ(raisedBy(*makeAdapter(extended.path())), libgit2_release::refusalOfWorktreeConfig);
 }
 
 TEST_F(StatusFailure, DoesNotComeOfALockedIndex)

@@ -71,7 +71,7 @@ struct Decision : Sentence
 {
     Change prepare;
     std::string analysis;
-    std::string preference = "";
+    std::string preference{};
     bool isFailure = false;
     std::string name = "topic";
 };

@@ -103,7 +103,7 @@ TEST_F(CloneSpecifier, OfNoRepositoryFailsAndLeavesTheGeneratorAsItWas)
         EXPECT_NE(failure.text, "") << specifier;
     }
     EXPECT_THAT(failureOfClone("nonsense://host/path").text,
-                testing::HasSubstr(libgit2Release::refusalOfScheme("nonsense://host/path")));
+                testing::HasSubstr(libgit2_release::refusalOfScheme("nonsense://host/path")));
     generate();
     expectCloned(clone_);
 }

@@ -13,6 +13,7 @@
 
 #include "RunCommandFixture.hpp"
 #include "support/Descriptors.hpp"
+#include "support/LogCapture.hpp"
 #include "support/WorkingFolder.hpp"
 
 namespace
