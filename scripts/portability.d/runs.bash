@@ -1,0 +1,56 @@
+# shellcheck shell=bash
+# SPDX-License-Identifier: MIT
+# The table of runs in docs/portability.md, which scripts/portability writes.
+
+# commit_of FOLDER: the abbreviated id of HEAD, with a plus sign if a tracked file differs from it. The
+# table itself, which each run changes, is not looked at.
+commit_of()
+{
+    local commit git=(git -C "$1" -c safe.directory='*')
+    commit=$("${git[@]}" rev-parse --short HEAD 2>/dev/null) || {
+        echo 'no history'
+        return
+    }
+    "${git[@]}" diff --quiet HEAD -- ':/' ':(top,exclude)docs/portability.md' || commit+=+
+    echo "$commit"
+}
+
+# ctest_result LOG CASES: what ctest has printed, and how many cases the programs have counted in a
+# file, which need not be there. Fails if the log tells no result.
+ctest_result()
+{
+    local cases=0
+    if [[ -e $2 ]]; then cases=$(awk '{ sum += $1 } END { print sum + 0 }' "$2"); fi
+    awk -v cases="$cases" '
+        /^[0-9]+% tests passed/ {
+            result = $NF - $4 " of " $NF
+            if (cases > 0) result = result ", with " cases " cases"
+        }
+        END { if (result == "") exit 1; print result }' "$1"
+}
+
+# program_result LOG: what a program of GoogleTest has printed. Fails if it did not come to its end.
+program_result()
+{
+    awk '
+        /^\[=+\] [0-9]+ tests? from / { all = $2 }
+        /^\[  PASSED  \] / { passed = $4 }
+        END { if (all == "" || passed == "") exit 1; print passed " of " all " cases" }' "$1"
+}
+
+# record DOCUMENT SYSTEM TESTS COMMIT RESULT: a line with today's date, in place of the line of these
+# tests on the same system. SYSTEM has the first columns, separated by " | ".
+record()
+{
+    local document=$1 key="| $2 | $3 |" new
+    if ! grep -qxF '<!-- end of runs -->' "$document"; then
+        echo "$document has no place for runs" >&2
+        return 1
+    fi
+    new=$(awk -v key="$key" -v line="$key $(date +%F) | $4 | $5 |" '
+        index($0, key) == 1 { next }
+        $0 == "<!-- end of runs -->" { print line }
+        { print }' "$document")
+    # In place: the file is shared with a root folder, by a mount.
+    printf '%s\n' "$new" >"$document"
+}
