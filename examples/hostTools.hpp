@@ -277,7 +277,7 @@ struct Failure
     }
 };
 
-/// The kind that an identifier of the catalogue stands for.
+/// Returns the kind of failure of an identifier of the catalogue.
 inline FailureKind kindOf(const std::string &id)
 {
     static constexpr std::pair<const char *, FailureKind> kinds[] = {

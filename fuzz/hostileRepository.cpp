@@ -133,7 +133,7 @@ std::vector<Operation> allOperations()
     return all;
 }
 
-/// A host tells failures apart by these; all others are faults, and end the process.
+/// Hosts distinguish failures by these exceptions; any other is a fault, and ends the process.
 void run(const Operation &operation, Subject &subject)
 {
     try

@@ -30,7 +30,7 @@ class FileCommands
     void askForMessage(const Snapshot &snapshot, const QString &author);
 
     Context context_;
-    /// Of the last revert.
+    /// What the last revert has kept.
     std::shared_ptr<const Rescue> rescue_;
 };
 

@@ -10,7 +10,7 @@
 namespace vclink::desktop
 {
 
-/// Both are UTF-16, and nothing is changed: neither the lone surrogates that stand for bytes that
+/// Both are UTF-16, and nothing is changed: neither the lone surrogates that represent bytes that
 /// are not UTF-8, nor a byte order mark at the beginning, which QString::fromUtf16 would drop.
 QString toQString(const ustring &text);
 ustring toUstring(const QString &text);

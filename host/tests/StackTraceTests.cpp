@@ -66,7 +66,7 @@ TEST(StackTrace, HoldsTheFramesOfTheRaisingCode)
         const auto caller = findFrame(trace, returnAddress);
         ASSERT_TRUE(caller.has_value());
         ASSERT_GT(*caller, 0U);
-        // The frame below the caller's is in the function that raised.
+        // The frame below the caller's is in the function that threw.
         const auto inside = reinterpret_cast<std::uintptr_t>(trace.frame(*caller - 1));
         const auto begin = reinterpret_cast<std::uintptr_t>(&raiseHere);
         EXPECT_TRUE(inside > begin && inside - begin < longestFunction);

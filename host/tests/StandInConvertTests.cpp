@@ -108,7 +108,7 @@ TEST(StandInConvert, KeepsOtherLoneSurrogatesApart)
     EXPECT_EQ(ustring_to_utf8(ustring(1, char16_t(0xDD00))), "\xED\xB4\x80");
     EXPECT_EQ(ustring_to_utf8(high + u"a" + low), "\xED\xA0\x80"
                                                   "a\xED\xB0\x80");
-    // Their bytes come back as escapes, which stand for the same bytes.
+    // Their bytes come back as escapes, which mean the same bytes.
     EXPECT_EQ(utf8_to_ustring("\xED\xA0\x80"), escapeAll("\xED\xA0\x80"));
     EXPECT_EQ(ustring_to_utf8(utf8_to_ustring(ustring_to_utf8(high))), "\xED\xA0\x80");
 }

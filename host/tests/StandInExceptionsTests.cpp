@@ -41,7 +41,7 @@ class Plain : public IException
     }
 };
 
-/// Can't produce its text, and raises what no one would expect.
+/// Cannot produce its text, and throws what no one would expect.
 class Speechless : public TagException
 {
   public:

@@ -36,8 +36,8 @@ constexpr int endOfFile = std::char_traits<char>::eof();
 class StandInFiles : public testing::Test
 {
   protected:
-    /// Of the descriptors of this process that refer to the file, whether they are closed in a
-    /// program that is started.
+    /// Whether each descriptor of this process that refers to the file is closed in a program
+    /// that is started.
     std::vector<bool> closedOnExec(const std::string &name) const
     {
         std::vector<bool> closed;

@@ -44,7 +44,7 @@ std::string workdirOf(git_repository *repository)
     return workdir != nullptr ? workdir : "";
 }
 
-/// Returns 0, or why files of the folder may not be created and removed.
+/// Returns 0, or why files of the folder cannot be created and removed.
 int accessError(const std::string &folder)
 {
     return ::faccessat(AT_FDCWD, folder.c_str(), W_OK | X_OK, AT_EACCESS) == 0 ? 0 : errno;

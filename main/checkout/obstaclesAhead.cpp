@@ -108,7 +108,7 @@ Finding findMissingFileOfOtherKind(WorkingCopy &copy, const TreeChange &change)
 Finding findSubmodule(WorkingCopy &copy, const TreeChange &change)
 {
     const bool isReplaced = isGitlink(change.before) && makesFile(change);
-    // Where ours has made it a folder, nothing of a submodule is left.
+    // If ours has made it a folder, nothing of a submodule is left.
     const bool isInTheWay =
         isReplaced && !copy.isFolderInHead(change.path) && copy.holdsFiles(change.path);
     return isInTheWay ? inTheWay(change.path, Standing::Folder) : Finding();

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-// The rules on this repository as it stands.
+// The rules, applied to this repository.
 #include <set>
 #include <string>
 

@@ -14,7 +14,7 @@ namespace vclink::test
 using Findings = std::vector<std::string>;
 
 /// host <- error <- util, options <- main: a file includes files of its own layer and of those
-/// below it only. The exported headers stand on the host's alone, and the examples on these two.
+/// below it only. The exported headers include only the host's, and the examples only these two.
 Findings findBrokenLayers(const SourceTree &tree);
 
 /// Within a layer each folder is a room: a file includes files of its own room, and of those that

@@ -45,7 +45,7 @@ Lines changes(const GitRepository &repository, const std::string &from, const st
     return pathsIn(repository.git({"diff-tree", "-r", "--name-only", from, to}));
 }
 
-/// What stands between "working copy: " and the next remark is a line for the shell.
+/// The text between "working copy: " and the next remark is a line for the shell.
 std::string wayOutOf(const std::string &refusal)
 {
     const std::string introduction = "working copy: ";

@@ -25,7 +25,7 @@ class Worker
     /// Throws away what an earlier worker left uncommitted, and goes to main.
     void tidy();
     /// Gives the operation something to do, and does it.
-    /// @throws std::out_of_range for an unknown name, and what the operation raises
+    /// @throws std::out_of_range for an unknown name, and what the operation throws
     void perform(const std::string &operation);
 
   private:

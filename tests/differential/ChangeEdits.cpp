@@ -125,9 +125,9 @@ void ChangeSequence::write(const std::string &path, const std::string &content)
 {
     const auto &tree = twins_.workingTree();
     const bool sameSize = tree.isFile(path) && tree.read(path).size() == content.size();
-    // libgit2 tells times apart by nanoseconds, git by seconds. A change of as many bytes in the
-    // second in which the file was checked out git can't see any more when libgit2 has written the
-    // index later. Such a change has another time here.
+    // libgit2 compares times by nanoseconds, git by seconds. If libgit2 writes the index later,
+    // git cannot see a change of the same size in the second in which the file was checked out.
+    // Such a change has another time here.
     const auto time = std::filesystem::file_time_type::clock::now() - ++hours_;
     twins_.edit(
         [&](WorkingCopyMaker &maker)

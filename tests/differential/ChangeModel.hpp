@@ -22,9 +22,9 @@ using Names = std::vector<std::string>;
 ///
 /// - Whether a file is added, removed or reverted goes by its state; see expectedStates().
 /// - A file that was moved as it is goes by its old name. The new one stays when it is removed.
-/// - A name means the file and all below it, or, if it has to be escaped, the file alone. Of a
-///   symbolic link it means what the link leads to, also where a folder was listed and the link
-///   found in it; see listedNames.hpp.
+/// - A name means the file and all below it, or, if it has to be escaped, the file alone. A
+/// symbolic link means its target, also if a folder was listed and the link found in it; see
+/// listedNames.hpp.
 /// - Ignored files and names of nothing are passed over where git refuses them.
 /// - A commit takes files in conflict as they stand.
 ///
@@ -41,11 +41,11 @@ class ChangeModel
     std::string markResolved(const std::string &name);
     std::string commit(const std::string &message);
 
-    /// Asks git anew.
+    /// Asks git again.
     void refresh();
     /// As refresh(), where nothing but the working tree has changed.
     void refreshStatus();
-    /// Of the last time that git was asked.
+    /// The result of the last question to git.
     const std::string &status() const noexcept
     {
         return status_;

@@ -332,7 +332,7 @@ bool ChangeSequence::hasIndexedBelow(const std::string &path)
                        { return isBelow(entry.first, path) && entry.second.indexMode != noMode; });
 }
 
-/// Leaves out files that a file stands in the way of: with these libgit2 fails. See
+/// Leaves out files that have another file in the way: libgit2 fails for these. See
 /// DifferencesFromGit.
 bool ChangeSequence::canBeReverted(const Names &names)
 {

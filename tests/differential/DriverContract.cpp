@@ -69,7 +69,7 @@ DriverOutcome readOutcome(const GitRepository &repository)
     return outcome;
 }
 
-/// Long contents are told by their length.
+/// Long contents are described by their length.
 std::string shorten(const std::string &text)
 {
     constexpr std::size_t most = 400;

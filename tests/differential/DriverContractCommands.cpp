@@ -92,7 +92,7 @@ std::vector<DriverCase> placeholderCases()
         describes("ALonePercentSign", "1 %A 100% %"),
         describes("TwoPercentSigns", "1 %A %%",
                   {Kind::OtherContent, "file:ours\nword:%\n", "file:ours\nword:%%\n"}),
-        // libgit2 tells no size where nobody asks for one.
+        // libgit2 reports no size if nobody requests one.
         describes("TheMarkerSize", "1 %A %L",
                   {Kind::OtherContent, "file:ours\nword:7\n", "file:ours\nword:0\n"}),
         describesPath("ThePath", "1 %A %P", "file"),

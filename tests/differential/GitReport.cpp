@@ -83,8 +83,8 @@ void readIndexEntry(const std::string &record, GitReport &report)
     file.unmerged = stage != 0;
 }
 
-/// What stands in the index without bytes, only intended to be added, and is gone from the working
-/// tree, git shows as if HEAD had it too.
+/// If a file is only intended to be added, without content in the index, and missing from the
+/// working tree, git reports it as if HEAD had it too.
 void removeFalseHeads(const GitRepository &repository, GitReport &report)
 {
     const auto isSuspect = [](const GitFile &file)

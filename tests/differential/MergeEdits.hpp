@@ -51,7 +51,7 @@ class MergeEdits
     {
     }
 
-    /// Of a tree to begin with.
+    /// The first tree.
     Tree makeTree();
 
     static std::size_t kindCount();
@@ -103,7 +103,7 @@ class MergeEdits
     bool renameOntoFolder(Tree &one, Tree &other);
 
     using Selection = std::function<bool(const TreeFile &file)>;
-    /// A path of a file that both trees have and that is what `isWanted` tells in both.
+    /// A path of a file that both trees have and for which `isWanted` returns true in both.
     std::optional<std::string> pickCommon(const Tree &one, const Tree &other,
                                           const Selection &isWanted);
     std::optional<std::string> pickText(const Tree &one, const Tree &other);

@@ -22,8 +22,8 @@ struct MergeCommit
 };
 
 /// The history of three branches, "tip0" to "tip2", over a few dozen files, with topic branches
-/// between them. It depends on the seed alone. The subject of a merge commit tells what the two
-/// sides did last.
+/// between them. It depends on the seed alone. The subject of a merge commit describes the last
+/// change of both sides.
 class MergeHistory
 {
   public:

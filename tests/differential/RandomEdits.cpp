@@ -108,7 +108,7 @@ void RandomWorkingCopy::changeFolder()
     case 0:
         return maker_.write(folder, makeContent(random_));
     case 1:
-        // Not a target of its own: git can't tell of files below a link that goes in a circle.
+        // Never a link to itself: git cannot report files below such a link.
         return maker_.link(random_.chance(50) ? "missing" : "..", folder);
     case 2:
         return maker_.makeFolder(folder);

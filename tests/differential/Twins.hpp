@@ -39,7 +39,7 @@ class Twins
     std::string commit(const std::string &message);
 
     /// Each lets the library do it, and fails the running test if anything is lost of what the user
-    /// has in the working tree or the index, or if a refusal has changed anything. Where git does
+    /// has in the working tree or the index, or if a refusal has changed anything. If git does
     /// something else, its working copy becomes like the library's.
     /// @return "refused", "as git", or "not as git"
     std::string switchTo(const std::string &branch);

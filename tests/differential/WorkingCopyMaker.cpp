@@ -226,7 +226,7 @@ void WorkingCopyMaker::settle()
             dateBack(entry->path());
         }
     }
-    // Its exit status only tells that some entries differ.
+    // Its exit status only means that some entries differ.
     repository_.tryGit({"update-index", "-q", "--unmerged", "--ignore-missing", "--refresh"});
 }
 

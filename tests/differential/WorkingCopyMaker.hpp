@@ -56,7 +56,7 @@ class WorkingCopyMaker
     /// Fills the index and the working tree from HEAD.
     void checkOut();
 
-    /// Each makes the folders above `path`, and replaces a file or link that stands there.
+    /// Each makes the folders above `path`, and replaces an existing file or link.
     void write(const std::string &path, const std::string &bytes);
     void link(const std::string &target, const std::string &path);
     /// Removes a file, a link or a folder with all it holds.
@@ -81,7 +81,7 @@ class WorkingCopyMaker
     bool isLink(const std::string &path) const;
     bool isFolder(const std::string &path) const;
     bool exists(const std::string &path) const;
-    /// Whether nothing but folders stands on the way to `path`.
+    /// Whether only folders are above `path`.
     bool canHold(const std::string &path) const;
 
   private:

@@ -42,9 +42,9 @@ FileState::State stateOf(const IndexChange &change, const GitFile &workTree)
     return changed ? FileState::Unknown : FileState::Clean;
 }
 
-/// A file that is only intended to be added stands in the index, without bytes. Git tells of it as
-/// new in the working tree; here what is in the index and not in HEAD is new in the index, and
-/// differs in the working tree as other files do.
+/// A file that is only intended to be added is in the index, without content. Git reports it as new
+/// in the working tree; here what is in the index and not in HEAD is new in the index, and differs
+/// in the working tree as other files do.
 GitFile withIntentionAsAddition(GitFile file)
 {
     const bool intended = file.workTree == 'A' || (file.workTree == 'D' && file.headMode == noMode);
@@ -99,7 +99,7 @@ States expectedStates(const GitReport &report, const Blobs &blobs,
         const bool isThere = change.letter != '.' || change.indexMode != noMode || here.untracked;
         if (isThere && !isKnown(change.path, states))
         {
-            // Where two entries have one path, the first stays.
+            // If two entries have one path, the first one counts.
             states.emplace(change.path, stateOf(change, here));
         }
     }

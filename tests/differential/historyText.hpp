@@ -18,7 +18,7 @@ std::string joinLines(const Lines &lines);
 
 /// A line like those of makeText(), which no other text has.
 std::string makeUniqueLine(Random &random);
-/// 20 to 60 lines, as of a program: some are blank, and some stand in every text.
+/// 20 to 60 lines, as in a program: some are blank, and some are in every text.
 std::string makeText(Random &random);
 /// Some bytes that are no text, in records of equal length.
 std::string makeBinary(Random &random);

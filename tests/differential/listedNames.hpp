@@ -20,8 +20,8 @@ bool isMeant(const std::string &path, const std::string &name);
 /// Whether one of the names means a path.
 bool isMeant(const std::string &path, const std::vector<std::string> &names);
 
-/// What the names in a list stand for below a root: of a symbolic link, at the end or on the way,
-/// what it leads to. What lies outside the root, and the root itself, is left out.
+/// What the names in a list mean below a root: a symbolic link, at the end or on the way, means its
+/// target. Leaves out the root itself, and everything outside it.
 std::vector<std::string> resolveNames(const std::filesystem::path &root,
                                       const std::vector<std::string> &names);
 

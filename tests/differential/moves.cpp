@@ -170,7 +170,7 @@ void joinMoves(Changes &changes, const Blobs &blobs)
     {
         apply(oldPath, changes[to], changes);
     }
-    // Of two at one place, what is deleted comes before what moved in.
+    // If two are in one place, the deleted one is before the one that moved in.
     std::stable_sort(changes.begin(), changes.end(),
                      [](const IndexChange &left, const IndexChange &right)
                      {

@@ -34,7 +34,7 @@ bool begins(const std::string &text, const std::string &beginning)
 }
 
 /// An error of libgit2 has its class and its text; a merge wraps it. The reader of a folder that
-/// can't be entered raises the standard's.
+/// cannot be entered throws the standard library's exception.
 bool isTyped(const std::string &outcome)
 {
     if (begins(outcome, "vclink::git::LibGit2Exception "))

@@ -38,7 +38,8 @@ class DiskFixture : public GitFixture, public testing::WithParamInterface<Operat
     void tryOnce(const std::function<std::string(const Action &)> &run,
                  const std::vector<std::string> &otherGists = {},
                  const std::vector<std::string> &losses = {});
-    /// Runs an action in a child process without privileges, to which the files belong meanwhile.
+    /// Runs an action in a child process without privileges, to which the files belong during that
+    /// time.
     /// @return its outcome, or how else the child ended
     std::string runInChild(const Action &action) const;
 
@@ -46,7 +47,7 @@ class DiskFixture : public GitFixture, public testing::WithParamInterface<Operat
     {
         return *trial_;
     }
-    /// What stands before the operation.
+    /// The state before the operation.
     const std::string &gistBefore() const noexcept
     {
         return gistBefore_;

@@ -133,8 +133,8 @@ class FullTemporaryFolder : public vclink::test::DiskFixture
     const SmallDisk disk_{environment().temporary()};
 };
 
-/// What a temporary file can't hold is missing from it without a word, which is meant: the tool
-/// meets what is there. Both sides stand in the history.
+/// Intentionally nothing says that a temporary file is incomplete: the tool gets what was written.
+/// Both sides are in the history.
 TEST_P(FullTemporaryFolder, GivesTheToolEmptyFiles)
 {
     if (!disk_.isMounted())

@@ -115,8 +115,8 @@ class WithoutPermission : public vclink::test::DiskFixture
             return {statusOfFile() + trial().normalGist()};
         return {};
     }
-    /// Without a HEAD that can be read a revert takes the files out of the index, which is meant,
-    /// and then fails; the next one puts them back.
+    /// If HEAD cannot be read, a revert intentionally removes the files from the index, and then
+    /// fails; the next one restores them.
     std::vector<std::string> losses(const Lack &lack) const
     {
         const bool isHeadless =

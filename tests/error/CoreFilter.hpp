@@ -11,7 +11,7 @@ namespace vclink::test
 {
 
 /// Asks a function about every record that is to be opened, for the life of the object. What the
-/// function raises goes to the code that wants to write.
+/// function throws reaches the code that writes.
 class CoreFilter
 {
   public:

@@ -36,7 +36,7 @@ using test::framesOf;
 using test::LogCapture;
 using testing::IsEmpty;
 
-/// Makes an exception, and tells where the caller goes on after the call.
+/// Makes an exception, and returns where the caller continues after the call.
 [[gnu::noinline]] GitException makeException(const void *&returnsTo)
 {
     returnsTo = __builtin_return_address(0);

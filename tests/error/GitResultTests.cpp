@@ -77,7 +77,7 @@ const std::string valueHook =
 const std::string errorHook =
     "static constexpr void vclink::git::GitErrorPolicy::wide_error_check(Impl&&)";
 
-/// Expects that `action` raises a bad_result_access with this text and source position.
+/// Expects that `action` throws a bad_result_access with this text and source position.
 template <class Action>
 void expectBadAccess(Action action, const std::string &text, const std::string &function, int line)
 {

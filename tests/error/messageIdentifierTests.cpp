@@ -30,7 +30,7 @@ static_assert(std::is_same_v<MsgArgument, boost::variant<long, std::string, ustr
 
 const ustring report = u"a/Z\u00FCrich\nb/\u6771\u4EAC";
 
-/// A message, its key and the arguments that it is raised with.
+/// A message, its key and its arguments.
 struct Row
 {
     BaseMsgID message;

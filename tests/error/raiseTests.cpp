@@ -139,7 +139,7 @@ TEST(TagException, HasTheStackAndTheTextOfTheBaseItWasMadeFrom)
     EXPECT_EQ(make().getText(), base.getText());
 }
 
-/// Raises, and tells where the caller goes on after the call.
+/// Throws, and returns where the caller continues after the call.
 [[gnu::noinline]] void raiseFromHere(const void *&returnsTo)
 {
     returnsTo = __builtin_return_address(0);

@@ -34,7 +34,7 @@ using vclink::test::Operation;
 using vclink::test::outcomeOf;
 
 constexpr std::array<int, 4> errors{EIO, ENOSPC, EACCES, EMFILE};
-/// Of the calls that an operation makes, how many fail with each of these in a test run.
+/// How many of an operation's calls fail with each of these in a test run.
 constexpr std::size_t share = 6;
 constexpr unsigned seed = 20260;
 
@@ -172,7 +172,7 @@ TEST_P(FailingFileCall, LeavesTheRepositoryInOrder)
     std::cout << '\n';
 }
 
-/// A commit of what stands in the index, the working tree and the files that tell of a merge.
+/// A commit of the content of the index, the working tree and the files of a merge.
 class CommitOverFailingCall : public FailingFileCall
 {
   protected:

@@ -55,8 +55,7 @@ std::vector<Operation> remoteOperations();
 std::vector<Operation> otherOperations();
 
 /// Runs an action.
-/// @return its answer behind "done", or what the exception is that it raises: type, code, class and
-/// text
+/// @return "done" and its result, or the exception that it throws: type, code, class and text
 std::string outcomeOf(const Action &action);
 /// The outcome that is a LibGit2Exception.
 std::string failure(int code, int errorClass, const std::string &text);

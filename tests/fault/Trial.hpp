@@ -22,7 +22,7 @@ class Trial
 {
   public:
     /// Has the operation run once, with nothing failing.
-    /// @param folder is made; what stands in the home folder is written over
+    /// @param folder is made; the content of the home folder is overwritten
     Trial(const Operation &operation, std::filesystem::path folder,
           const HermeticEnvironment &environment);
 

@@ -4,8 +4,8 @@
 
 #include "support/interposition.hpp"
 
-/// Stands before boost::filesystem::path::compare, which must not raise and yet allocates up to
-/// release 1.76: there a failing allocation ends the process, whoever compares.
+/// Replaces boost::filesystem::path::compare, which must not throw and yet allocates up to release
+/// 1.76: there a failing allocation ends the process, whoever compares.
 extern "C" __attribute__((visibility("default"))) int comparePaths(const void *left,
                                                                    const void *right) noexcept
     __asm__("_ZNK5boost10filesystem4path7compareERKS1_");

@@ -29,7 +29,7 @@ class FailingAllocation : public vclink::test::AdapterFixture
   protected:
     /// Runs the action again and again, each time with a later allocation failing, until none of
     /// its own does.
-    /// @return how many of the runs raised std::bad_alloc
+    /// @return how many of the runs threw std::bad_alloc
     template <class Action> static int failEach(Action action)
     {
         int raised = 0;
@@ -72,7 +72,7 @@ TEST_F(FailingAllocation, IsRaisedByAProbe)
 }
 
 /// What fails in the walk's callback ends the walk, and waits in the slot. (Boost.Filesystem 1.74
-/// compares paths in a function that must not raise, and allocates there, so that no failure can be
+/// compares paths in a function that must not throw, and allocates there, so that no failure can be
 /// put into the resolving of paths.)
 TEST_F(FailingAllocation, EndsAStatusWalkInItsCallback)
 {

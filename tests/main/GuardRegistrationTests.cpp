@@ -57,8 +57,8 @@ class GuardRegistration : public AdapterFixture
         repository_.commitAll("ours");
     }
 
-    /// Whether a merge by an adapter that stands already runs the command; without it the file
-    /// stays in conflict. The repository is then as before.
+    /// Whether a merge by an existing adapter runs the command; without it the file stays in
+    /// conflict. The repository is then as before.
     bool runsTheCommand(vclink::git::GitAdapter &adapter) const
     {
         const std::string before = repository_.line({"rev-parse", "HEAD"});
@@ -121,7 +121,7 @@ TEST_F(GuardRegistration, IsLostWithAProbeThatSaysNoOrFails)
     EXPECT_FALSE(GitAdapterFactory().isAdapterFor(asPath(folder() / "missing")));
     EXPECT_FALSE(runsTheCommand(*adapter));
     adapter = newAdapter();
-    // The new adapter stood before the old one went.
+    // The new adapter existed before the old one was destroyed.
     EXPECT_FALSE(isRegistered());
     adapter.reset();
     adapter = newAdapter();

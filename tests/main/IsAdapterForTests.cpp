@@ -121,7 +121,7 @@ TEST_F(IsAdapterFor, RaisesWhereTheFolderCannotBeReached)
               "true " + std::to_string(GIT_ERROR));
 }
 
-/// libgit2 tells such a folder not from one without a repository.
+/// libgit2 cannot distinguish such a folder from one without a repository.
 TEST_F(IsAdapterFor, AnswersAsLibGit2DoesForAFolderThatCannotBeLookedInto)
 {
     vclink::test::giveToUnprivilegedUser(repository_.path());

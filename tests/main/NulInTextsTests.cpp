@@ -40,7 +40,7 @@ struct NulCall
     std::function<void()> call;
 };
 
-/// What LibGit2Exception is raised, by itself or as the cause of a failed merge.
+/// The LibGit2Exception that is thrown, by itself or as the cause of a failed merge.
 std::string nulFailureOf(const std::function<void()> &call)
 {
     try

@@ -8,7 +8,7 @@
 namespace vclink::test
 {
 
-/// A host's own factory, which tells when it is asked for options and when it goes.
+/// A host's own factory, which records when it is asked for options and when it is destroyed.
 class TestOptionsFactory : public git::GitOptionsFactory
 {
   public:

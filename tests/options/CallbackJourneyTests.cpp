@@ -38,7 +38,7 @@ struct FromCallback : std::runtime_error
     using std::runtime_error::runtime_error;
 };
 
-/// Members for the callbacks of walks, checkouts and fetches, which do what a test tells them.
+/// Members for the callbacks of walks, checkouts and fetches, which do what a test sets.
 class Members
 {
   public:

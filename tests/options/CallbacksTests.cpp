@@ -38,7 +38,7 @@ using testing::IsEmpty;
 using testing::StartsWith;
 using vclink::util::exception::CancelledOperationException;
 
-/// What is called through the bridge, and does what a test tells it.
+/// The object that is called through the bridge, and does what a test sets.
 class Target
 {
   public:
@@ -194,7 +194,7 @@ template <class Call> std::string tracedAs(Call call)
 }
 
 #ifdef __clang__
-// clang's text of a lambda tells the arguments' types only.
+// clang's text of a lambda has only the arguments' types.
 constexpr const char *memberInSignature = "std::tuple<const char *, unsigned int, void *>";
 #else
 constexpr const char *memberInSignature = "Target::answer";

@@ -98,7 +98,7 @@ TEST_F(DebianPackages, OfTheLibraryDependsOnWhatItIsLinkedWith)
         EXPECT_THAT(depends, HasSubstr(needed));
     }
     EXPECT_THAT(depends, HasSubstr(host + " (>= " VCLINK_VERSION ")"));
-    // Of the stand-in alone.
+    // Dependencies of the stand-in only.
     EXPECT_THAT(depends, AllOf(Not(HasSubstr("locale")), Not(HasSubstr("-dev"))));
 }
 
@@ -180,7 +180,7 @@ TEST_F(DebianPackages, TellTheLicenceAsDebiansToolsReadIt)
     }
 }
 
-/// What is meant is told in the packages, with its reason.
+/// The packages list intended exceptions, with their reasons.
 TEST_F(DebianPackages, HaveNothingThatDebiansPolicyRemarks)
 {
     std::vector<std::string> lintian{"lintian", "--allow-root", "--fail-on", "error,warning"};

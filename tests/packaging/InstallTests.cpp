@@ -24,7 +24,7 @@ using testing::Not;
 const std::string libraries = VCLINK_LIBRARY_FOLDER;
 const std::string version = VCLINK_VERSION;
 
-/// What every package tells of itself.
+/// The description of every package.
 std::vector<std::string> with(std::vector<std::string> files, const std::string &package)
 {
     files.push_back("share/doc/" + package + "/changelog.gz");

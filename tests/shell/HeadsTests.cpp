@@ -16,7 +16,7 @@ using testing::IsEmpty;
 class ShellHeads : public ShellRemoteFixture
 {
   protected:
-    /// What git says, written as the program does: git tells symbolic references first.
+    /// What git says, written as the program does: git lists symbolic references first.
     std::string expected() const
     {
         std::string text;

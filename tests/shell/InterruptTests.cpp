@@ -19,8 +19,8 @@ using testing::Not;
 
 constexpr int fileCount = 1000;
 
-/// Real signals, sent when the program has written what tells how far it is. It can't get much
-/// further then, as the terminal takes no more before it is read.
+/// Real signals, sent when the program has written how far it is. It can't get much further then,
+/// as the terminal takes no more before it is read.
 class ShellInterrupt : public ShellFixture
 {
   protected:

@@ -57,7 +57,7 @@ template <class Condition> bool waitUntil(Condition isTrue)
 }
 
 std::atomic<shell::Activity::Clock::rep> ticks{0};
-/// Whether the clock, which the watch asks before it gives up, stands until its end has begun.
+/// Whether the clock, which the watch reads before it gives up, stops until its end has begun.
 std::atomic<bool> standsUntilRestored{false};
 
 shell::Activity::Clock::time_point readTicks()

@@ -15,7 +15,7 @@ using testing::Not;
 class ShellLog : public ShellFixture
 {
   protected:
-    /// What stands on standard error after a failure with these severities shown.
+    /// The text on standard error after a failure with these severities shown.
     std::string logOfFailure(const std::string &severities) const
     {
         const CommandResult result = shell({"-C", "broken", "--log", severities, "status"}).run();

@@ -171,7 +171,7 @@ TEST_F(ShellInterruptedMerge, NamesTheLockThatItHasLeft)
     EXPECT_THAT(fail({"merge", "other"}), EndsWith('\n' + withLock));
 }
 
-/// What tells the back end that it was interrupted is there until its next operation.
+/// The sign of its interruption exists until the back end's next operation.
 TEST_F(ShellInterruptedMerge, IsNotTakenForAMergeThatGitHasBegunSince)
 {
     repository_.git({"config", "--unset", "merge.kills.driver"});

@@ -20,8 +20,8 @@ using Records = std::vector<Record>;
 /// The pieces of a text, each of which ends with `end`.
 std::vector<std::string> split(const std::string &text, char end);
 
-/// Reads the output of the status command, whose lines end with `end`. A line that is no record
-/// stands in the result with an empty state.
+/// Reads the output of the status command, whose lines end with `end`. A line that is not a record
+/// has an empty state in the result.
 Records parseRecords(const std::string &output, char end = '\n');
 
 /// Base of the tests that run the program. Each has a folder of its own, in which it runs unless

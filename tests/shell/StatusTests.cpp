@@ -20,7 +20,7 @@ class ShellStatus : public ShellFixture
 {
 };
 
-/// What the program calls what git tells with two letters.
+/// The program's words for git's two letters.
 std::string stateFor(const std::string &letters)
 {
     static const std::map<std::string, std::string> states{

@@ -24,7 +24,7 @@ class TerminalProcess
     TerminalProcess &operator=(const TerminalProcess &) = delete;
     ~TerminalProcess();
 
-    /// Reads until this text has appeared, and no more than stands there already.
+    /// Reads until this text has appeared, and no more than is already there.
     /// @throws std::runtime_error when it has not within a minute, or the program has ended
     void readUntil(const std::string &text);
     /// Reads until nobody holds the terminal any more.

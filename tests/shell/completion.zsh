@@ -1,7 +1,7 @@
 #!/usr/bin/env zsh
 # SPDX-License-Identifier: MIT
 # completion.zsh SHELL COMPLETION: a zsh at a terminal offers every command and option that
-# vclink-shell tells of in its help. What it offers is read from the completion's own last step.
+# the help of vclink-shell lists. What it offers is read from the completion's own last step.
 emulate -R zsh
 setopt err_exit no_unset pipe_fail
 zmodload zsh/zpty zsh/zselect
@@ -94,7 +94,7 @@ expect 'vclink-shell --progress a' auto
 expect 'vclink-shell --log parameter,stack' stack-trace
 expect 'vclink-shell -C har' harbour
 expect 'vclink-shell -C harbour sta' status
-# As it is to stand on the command line.
+# Quoted as the command line needs it.
 expect 'vclink-shell -C birds switch s' 'sea\$\(id\)'
 git -C birds remote add nest $folder/nest
 touch 'birds/a new one' birds/tracked

@@ -1,7 +1,7 @@
 #!/usr/bin/env bash
 # SPDX-License-Identifier: MIT
-# documents.bash SHELL MAN COMPLETION: every command and option that vclink-shell tells of in its help
-# has its place in the manual page, and is offered by the completion.
+# documents.bash SHELL MAN COMPLETION: every command and option in the help of vclink-shell is in
+# the manual page, and the completion offers it.
 set -euo pipefail
 
 shell=$1 manual=$2

@@ -38,7 +38,7 @@ inline Change makesExecutable(const std::string &name)
     return [=](const GitRepository &copy) { copy.setMode(name, 0755); };
 }
 
-/// A symbolic link, in the place of what stands there.
+/// A symbolic link, which replaces what is there.
 inline Change links(const std::string &target, const std::string &name)
 {
     return [=](const GitRepository &copy)

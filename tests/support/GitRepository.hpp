@@ -21,7 +21,7 @@ class GitRepository
     /// A clone of `source`.
     static GitRepository clone(const std::filesystem::path &source,
                                const std::filesystem::path &folder);
-    /// A working copy that stands already.
+    /// An existing working copy.
     explicit GitRepository(std::filesystem::path folder);
 
     const std::filesystem::path &path() const noexcept

@@ -58,7 +58,7 @@ bool isPersonal(const std::string &variable)
     return false;
 }
 
-/// Runs `action` if libgit2 runs: its start count tells, and only starting it once more gives it.
+/// Runs `action` if libgit2 runs. Only starting it again returns its start count, which shows that.
 template <class Action> void whileLibGit2Runs(Action action)
 {
     const bool runs = git_libgit2_init() > 1;

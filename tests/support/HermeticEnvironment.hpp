@@ -9,7 +9,7 @@ namespace vclink::test
 {
 
 /// Sets the process's environment so that neither Git nor libgit2 finds anything of the person who
-/// runs the tests, and puts back the whole environment at the end, whatever was changed meanwhile.
+/// runs the tests, and restores the whole environment at the end, whatever has changed.
 ///
 /// HOME, the XDG folders and TMPDIR lie in a given folder; there is no identity, no variable of
 /// Git's own but GIT_CONFIG_NOSYSTEM, GIT_TERMINAL_PROMPT and GIT_EDITOR, no USER, LOGNAME, ssh

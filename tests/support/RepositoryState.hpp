@@ -17,7 +17,7 @@ namespace vclink::test
 /// that nothing refers to do not count.
 struct RepositoryState
 {
-    /// Names relative to the root as bytes, with what stands there.
+    /// Names relative to the root as bytes, with the content.
     using Entries = std::map<std::string, std::string>;
 
     /// The branch that HEAD names, if any, and the commit's id, if there is one.
@@ -31,7 +31,7 @@ struct RepositoryState
     /// `git ls-files -v --stage`: tag, mode, id and stage of each name, a line a stage.
     Entries index;
     /// Mode and content of each file below the root, the repository's own folder left out. Long
-    /// contents are told by length and hash.
+    /// contents are replaced by length and hash.
     Entries workingTree;
 };
 
@@ -58,7 +58,7 @@ struct FileStamp
 
 /// @throws std::system_error when the file can't be examined
 FileStamp stampOf(const std::filesystem::path &file);
-/// Of the repository's index file.
+/// The state of the repository's index file.
 FileStamp indexStampOf(const GitRepository &repository);
 
 bool operator==(const FileStamp &left, const FileStamp &right);

@@ -28,8 +28,8 @@ class RecordingProgressReporter : public ProgressReporter
     std::vector<ustring> messages;
     /// The calls of both kinds.
     std::vector<ProgressCall> calls;
-    /// Where it is set, called at the end of each call with the call's number, 1 for the first.
-    /// What it raises goes to the caller.
+    /// If set, called at the end of each call with the call's number, 1 for the first. The caller
+    /// receives what it throws.
     std::function<void(std::size_t number)> onCall;
 
   private:

@@ -8,8 +8,8 @@
 namespace vclink::test
 {
 
-/// Holds a thousand descriptors open, until its end, and lets the process open so many. Those that
-/// are opened meanwhile have higher numbers.
+/// Holds a thousand descriptors open, until its end, and lets the process open so many. Descriptors
+/// that are opened during that time have higher numbers.
 class ThousandDescriptors
 {
   public:

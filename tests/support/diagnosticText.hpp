@@ -22,7 +22,7 @@ template <class Exception> std::string diagnosticTextOf(const Exception &excepti
     }
 }
 
-/// Of an exception that is neither, here an int, nothing is known.
+/// Nothing is known about an exception that is neither, here an int.
 inline std::string diagnosticTextOf(int /*exception*/)
 {
     return "No diagnostic information available.";

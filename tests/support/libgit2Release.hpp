@@ -8,9 +8,9 @@
 #include <git2/errors.h>
 #include <git2/version.h>
 
-/// What the releases of libgit2 do differently and a test binds, a line each. Tests read it here
-/// and have no conditions on a release of their own. Tried are 1.5 and 1.9: where nothing tells
-/// which release between them brought a difference, it counts as 1.9's.
+/// The differences between releases of libgit2 on which tests depend, a line for each. Tests have
+/// no other conditions on a release. 1.5 and 1.9 were tried: if it is unknown which release between
+/// them brought a difference, it counts as 1.9's.
 namespace vclink::test::libgit2_release
 {
 
@@ -56,11 +56,11 @@ inline std::string refusalOfScheme(const std::string &address)
 constexpr std::string_view endOfSshTries =
     isSince(1, 9) ? "Failed getting response"
                   : "Failed to retrieve list of SSH authentication methods";
-/// A missing ssh agent is told at the first request for credentials. Later releases ask again until
-/// the server has had enough.
+/// A missing ssh agent is reported at the first request for credentials. Later releases ask again
+/// until the server has had enough.
 constexpr bool tellsOfMissingAgent = !isSince(1, 9);
 
-/// Whether libgit2 tells of no failure: without one there is no record, or one that says so.
+/// Whether libgit2 reports no failure: then there is no record, or one that says so.
 inline bool isSilent()
 {
     const git_error *const record = git_error_last();

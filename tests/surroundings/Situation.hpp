@@ -20,7 +20,7 @@ enum class Holds
     Submodule
 };
 
-/// Where an obstacle stands, and what the other branch does there.
+/// The place of an obstacle, and what the other branch does there.
 struct Place
 {
     std::string name;
@@ -63,7 +63,7 @@ std::string siblingOf(const std::string &path);
 const std::vector<Place> &submodulePlaces();
 const std::vector<Obstacle> &submoduleObstacles();
 
-/// Where ours, too, has done something to a submodule: on "ours-adds", "ours-moves",
+/// Places of submodules that ours has changed, too: on "ours-adds", "ours-moves",
 /// "ours-removes", "ours-files" and "ours-folders".
 const std::vector<Place> &addedSubmodulePlaces();
 const std::vector<Place> &movedSubmodulePlaces();

@@ -148,7 +148,7 @@ const std::vector<SubmoduleOperation> submoduleOperations{
     besideSiblings({"merge of submodules", "ours", mergeByGit, mergeInto, 2}),
     besideSiblings({"switch of submodules", "main", {"switch", "--quiet"}, switchTo, 2})};
 
-/// Of the obstacles that have nothing to do with submodules, those that may matter to them.
+/// The obstacles other than submodules that can matter to submodules.
 const std::vector<std::string> otherObstacles{"untracked file",
                                               "ignored file",
                                               "link to a folder",

@@ -41,7 +41,7 @@ class Surroundings : public GitFixture
         const Obstacle &obstacle;
         const Place &place;
         std::vector<std::string> byGit;
-        /// @return what was raised
+        /// @return what was thrown
         std::function<std::string(const std::filesystem::path &copy)> byLibrary;
         std::function<void(const GitRepository &copy)> prepare = [](const GitRepository &) {};
     };

@@ -20,8 +20,8 @@ class RunningDaemon
     static void stopServer();
 };
 
-/// Base of the fixtures that need one real server. A repository with files that take a while to
-/// transfer stands on it.
+/// Base of the fixtures that need one real server. It has a repository with files that take some
+/// time to transfer.
 class DaemonFixture : public RunningDaemon, public RemoteFixture
 {
   protected:

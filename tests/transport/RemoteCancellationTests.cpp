@@ -60,7 +60,7 @@ class RemoteCancellation : public vclink::test::DaemonFixture
         return relayTo(server().port(), plan);
     }
 
-    /// Of a clone into the test's one folder.
+    /// For a clone into the test's only folder.
     testing::AssertionResult isCloneCancelled(const std::string &url) const
     {
         return isCancelled([&] { generate(url); });

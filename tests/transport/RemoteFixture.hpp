@@ -50,7 +50,7 @@ class RemoteFixture : public GitFixture
 
     /// A clone made by a generator of its own, in the test's folder.
     GitRepository clone(const std::string &url, const std::string &name) const;
-    /// Of the remote "origin", with an adapter of its own.
+    /// The remote "origin", with its own adapter.
     void fetch(const GitRepository &repository,
                const std::vector<std::string> &refspecs = {}) const;
     void push(const GitRepository &repository, const std::vector<std::string> &refspecs) const;

@@ -33,7 +33,7 @@ class Descriptor
 };
 
 /// One end of a connection, for a script. Nothing waits for longer than a minute, nor after the
-/// server's end has begun; what can't go on raises, which ends the script.
+/// server's end has begun; a call that cannot continue throws, which ends the script.
 class Connection
 {
   public:
@@ -44,7 +44,7 @@ class Connection
 
     /// What has come, at most `limit` bytes; empty when the other side has closed.
     std::string read(std::size_t limit);
-    /// Reads until all of `end` has come. An earlier close raises.
+    /// Reads until all of `end` has arrived. Throws if the connection is closed before.
     std::string readUntil(const std::string &end);
     void write(const std::string &bytes);
     /// Waits until the other side closes, whatever it says before.
@@ -77,7 +77,7 @@ class Connection
 class ScriptedServer
 {
   public:
-    /// @param script may raise, which ends the connection
+    /// @param script can throw, which ends the connection
     explicit ScriptedServer(std::function<void(Connection &connection)> script);
     ScriptedServer(const ScriptedServer &) = delete;
     ScriptedServer &operator=(const ScriptedServer &) = delete;

@@ -66,8 +66,8 @@ struct ListeningServer
 using PortsToArguments =
     std::function<std::vector<std::string>(const std::vector<std::uint16_t> &ports)>;
 
-/// Starts a program on ports that are free, and waits until it listens on all of them. Where
-/// someone else takes a port meanwhile, other ports are tried.
+/// Starts a program on ports that are free, and waits until it listens on all of them. If another
+/// program uses a port first, other ports are tried.
 /// @throws std::runtime_error, with the program's log, when it does not come up
 ListeningServer startListening(std::size_t portCount, const std::filesystem::path &folder,
                                const PortsToArguments &makeArguments);

@@ -10,8 +10,8 @@
 namespace vclink::test
 {
 
-/// Base of the suites that run over every transport. An empty repository stands on the server, and
-/// a working copy, whose "origin" is the repository's plain path.
+/// Base of the suites that run over every transport. The server has an empty repository, and there
+/// is a working copy whose "origin" is the repository's plain path.
 class TransportFixture : public RunningServer, public RemoteFixture
 {
   protected:

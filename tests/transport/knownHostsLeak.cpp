@@ -1,9 +1,9 @@
 // SPDX-License-Identifier: MIT
 
 /// libgit2 1.5 does not release the two paths that it makes for each ssh connection when it looks
-/// for the file of known hosts. What it calls of libssh2 right before and right after stands here,
-/// in the program, which is found first: what is allocated in between is not held against anybody.
-/// A suppression would have to name libgit2 as a whole, which hides what the library forgets.
+/// for the file of known hosts. The functions of libssh2 that it calls right before and right after
+/// are here, in the program, where they are found first: allocations in between do not count. A
+/// suppression would have to name libgit2 as a whole, which hides what the library forgets.
 #include "support/interposition.hpp"
 
 // There are none without the leak sanitizer.

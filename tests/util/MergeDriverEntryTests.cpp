@@ -41,7 +41,7 @@ using vclink::test::LogCapture;
 using vclink::test::LogRecord;
 using vclink::test::Scripts;
 
-/// What the source of a merge tells.
+/// The content of the source of a merge.
 struct Source
 {
     const git_index_entry *ancestor = nullptr;

@@ -62,10 +62,10 @@ class MergeDriverFixture : public GitFixture
     /// git_merge, as the library calls it. Checks that nothing stays behind.
     /// @return its code
     int merge(TemporaryFiles files = TemporaryFiles::Go) const;
-    /// The same; a failure is raised.
+    /// The same; throws a failure.
     void mergeOrThrow() const;
 
-    /// What stands in the index, a line for each entry: mode, stage, name, tab-separated.
+    /// The content of the index, a line for each entry: mode, stage, name, tab-separated.
     std::vector<std::string> index() const;
     /// The bytes of an entry in the index.
     std::string staged(const std::string &name, int stage = 0) const;

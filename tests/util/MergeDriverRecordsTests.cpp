@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-// What the driver tells the log, record by record, and in which order it clears away.
+// The driver's records in the log, and the order in which it cleans up.
 #include <filesystem>
 #include <string>
 #include <vector>

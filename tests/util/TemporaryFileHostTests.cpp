@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-// What a temporary file becomes, whatever stands under the name that the host gives.
+// The result of a temporary file, whatever already exists under the host's name.
 #include <cstdarg>
 #include <filesystem>
 #include <string>

@@ -125,7 +125,7 @@ TEST_F(TemporaryFile, ThatCannotBeRemovedIsToldOfAndLeft)
     EXPECT_EQ(log.records()[1].severity, 0x200U);
     EXPECT_EQ(log.records()[1].message, "Could not remove temporary file: " + file);
     EXPECT_TRUE(fs::exists(file));
-    // Without an exception even when the log raises one.
+    // Without an exception even if the log throws one.
     log.clear();
     log.onRecord([](const LogRecord &) { throw std::runtime_error("sink"); });
     git::removeTemporaryFile(asPath(file));

@@ -8,7 +8,7 @@ int useAll(int number)
 {
     const char byte = 'a';
     countUp(number);
-    // Of a call the compiler could keep the result alone.
+    // The compiler could keep only the result of a call.
     bool (*const volatile asked)() noexcept = isOptimised;
     return successor(number) + byteAt(&byte, 0) + (asked() ? 1 : 0);
 }

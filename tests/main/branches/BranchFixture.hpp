@@ -32,7 +32,7 @@ class BranchFixture : public AdapterFixture
     }
     /// The id that git finds for a revision.
     std::string idOf(const std::string &revision) const;
-    /// The branch that HEAD names, as git tells it; empty when it is detached.
+    /// The branch that HEAD names, as git reports it; empty if it is detached.
     std::string currentBranch() const;
     /// git's status, an entry a path.
     std::vector<std::string> status() const;

@@ -139,7 +139,7 @@ TEST_F(CreateBranch, FailsBeforeTheFirstCommit)
     EXPECT_NO_THROW(create("topic", "main"));
 }
 
-/// Of a branch that is not merged.
+/// For a branch that is not merged.
 TEST_F(DeleteBranch, RemovesOneReferenceAndChangesNothingElse)
 {
     const RepositoryState expected = stateOf(repository_);

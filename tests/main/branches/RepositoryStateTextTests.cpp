@@ -138,7 +138,7 @@ TEST_F(RepositoryStateText, FailsOnlyWhereTheRepositoryCannotBeOpened)
     EXPECT_EQ(failureOf([this] { branches().getRepositoryState(); }).code, GIT_ENOTFOUND);
 }
 
-/// Nothing tells then whether a merge is under way, and what would write must not guess.
+/// Then it is unknown whether a merge is under way, and operations that write must not guess.
 TEST_F(RepositoryStateText, IsNormalWhereMergeHeadCannotBeLookedAt)
 {
     const std::string file = repository_ / ".git/MERGE_HEAD";

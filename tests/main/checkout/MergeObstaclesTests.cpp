@@ -207,7 +207,7 @@ TEST_F(MergeObstacles, AreNotIgnoredFilesWhichAreOverwrittenAsGitDoes)
     expectCleanAsGit();
 }
 
-/// libgit2 opens the name for writing, and tells of it too late to be refused.
+/// libgit2 opens the name for writing, and reports it too late to be refused.
 TEST_F(MergeObstacles, AreAllFoldersWhereWeDeletedAFileThatTheyChanged)
 {
     diverge([&] { repository_.remove("file"); }, writing("file", "theirs\n"));
@@ -387,7 +387,7 @@ TEST_F(MergeObstacles, AreIgnoredLinksAboveAConflict)
     expectConflictsAsGit({"1 d/f", "3 d/f"});
 }
 
-/// Also of a file that they have given another name, which no change of theirs tells.
+/// Also for a file that they have renamed, which none of their changes shows.
 TEST_F(MergeObstacles, AreIgnoredLinksWhereTheyRenamedWhatWeDeleted)
 {
     diverge([this] { repository_.remove("file"); },

@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: MIT
-// What a merge meets that libgit2 does not tell of, for its walk is past it, or that it takes for
-// something of its own.
+// Obstacles of a merge that libgit2 does not report because its walk has passed them, or because it
+// treats them as its own.
 #include <filesystem>
 #include <string>
 #include <vector>
@@ -117,7 +117,7 @@ TEST_F(PassedObstacles, AreLinksWhereAnUnrelatedHistoryHasASubmodule)
     EXPECT_EQ(idOf("HEAD:n/module"), id);
 }
 
-/// A conflict is written there, and libgit2 tells of none.
+/// A conflict is written there, and libgit2 reports none.
 TEST_F(PassedObstacles, AreIgnoredFifosWhereWeDeletedAFileThatTheyChanged)
 {
     diverge([this] { repository_.remove("d/f"); }, writing("d/f", "theirs\n"));

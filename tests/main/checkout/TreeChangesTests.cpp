@@ -33,7 +33,7 @@ class TreeChanges : public vclink::test::BranchFixture
         repository_.commitAll("first");
     }
 
-    /// "letter path", as git tells it without renames.
+    /// "letter path", as git reports it without renames.
     std::vector<std::string> byGit(const std::string &before, const std::string &after) const
     {
         std::vector<std::string> lines = splitLines(
@@ -56,7 +56,7 @@ class TreeChanges : public vclink::test::BranchFixture
                               });
         return lines;
     }
-    /// Expects what git tells, type changes aside, which git tells with a letter of their own.
+    /// Expects what git reports, except type changes, for which git has its own letter.
     void expectAsGit(const std::string &before, const std::string &after) const
     {
         auto expected = byGit(before, after);

@@ -224,7 +224,7 @@ TEST_F(GitAttributesTest, SeesTheFilesAsTheyAreAtEachQuery)
     EXPECT_EQ(now(), "!x");
     repository_.write(".gitattributes", "* x\n");
     EXPECT_EQ(now(), "x");
-    // The same length, so that nothing but a new reading tells.
+    // The same length, so that only reading again shows the change.
     repository_.write(".gitattributes", "* y\n");
     EXPECT_EQ(now(), "!x");
     repository_.remove(".gitattributes");

@@ -51,8 +51,8 @@ class GitConfigFixture : public GitFixture
     static void writeFile(const std::filesystem::path &file, const std::string &bytes);
     /// What git finds for a key, the user's files only.
     std::string byGit(const std::string &key) const;
-    /// What `action` answers in a process of its own in which libgit2 starts anew, with this
-    /// environment; an empty value is no variable.
+    /// The result of `action` in a separate process, in which libgit2 starts again, with this
+    /// environment; an empty value means no variable.
     std::string runIn(const std::map<std::string, std::string> &environment,
                       const std::function<std::string()> &action) const;
 

@@ -67,7 +67,7 @@ TEST_F(GitConfigFile, HoldsTheseLinesAfterAllThreeWritesAndGivesThemBackAsGitDoe
     config.writeAutoMergeDriver();
     config.writeMergeTool();
     config.writeDiffTool();
-    // No write adds a line that stands already.
+    // No write repeats an existing line.
     config.writeAutoMergeDriver();
     EXPECT_EQ(read(global()),
               "[merge \"vkAutoMerge\"]\n"
@@ -143,7 +143,7 @@ TEST_F(GitConfigFile, HasAnExistingValueReplaced)
                               "\tmore = x\n[user]\n\tname = Somebody\n");
 }
 
-/// Of a repository, of the system, and a subsection in other letters.
+/// A repository's and the system's configuration, and a subsection in other letters.
 TEST_F(GitConfigFile, OfOthersIsNotSeen)
 {
     const auto repository = makeRepository();

@@ -243,7 +243,7 @@ TEST_F(AddFiles, TakesALinkForItsTarget)
     expectRefuses({"file"}, {"known"});
 }
 
-/// The files that the folder stands for are looked up by name once more.
+/// The files in the folder are looked up by name again.
 TEST_F(AddFiles, TakesALinkAmongTheFilesOfAFolderForItsTarget)
 {
     repository_.write("target", "x");

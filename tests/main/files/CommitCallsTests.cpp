@@ -193,7 +193,7 @@ TEST_F(CommitCalls, PutNothingBackWhenAConflictEnds)
     EXPECT_THAT(namesIn(), ElementsAre("file", "other", "sub/inside"));
 }
 
-/// HEAD can't be told for whatever reason: libgit2 tells it when the commit is made.
+/// HEAD is unknown for some reason: libgit2 reports it when the commit is made.
 TEST_F(CommitCalls, GoOnWithoutAParentWhenHeadFails)
 {
     startNoting();

@@ -298,7 +298,7 @@ TEST_F(ForbiddenCommit, OnABranchThatCannotBeReadIsToldWhenTheCommitIsMade)
     EXPECT_EQ(stateOf(repository_), state);
 }
 
-/// The commit stands, and so does what could not be removed.
+/// The commit exists, and so does what could not be removed.
 TEST_F(ForbiddenCommit, ThatCannotEndWhatIsUnderWayLeavesTheCommit)
 {
     repository_.write(".git/sequencer/todo", "");

@@ -133,7 +133,7 @@ TEST_P(IdentifiedPerson, IsInTheCommitAndTheReflog)
               expected + '>');
 }
 
-/// The host stands behind an identity that ends in an at sign.
+/// An identity that ends in an at sign is followed by the host name.
 const Person identifiedPersons[]{
     {{"Configured"},
      "builder",

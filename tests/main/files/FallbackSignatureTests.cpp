@@ -31,7 +31,7 @@ std::string textOf(const git_signature &signature)
     return std::string(signature.name) + " <" + signature.email + ">";
 }
 
-/// Of a machine whose name can't be found out for this reason; 0 for none told.
+/// For a machine whose name cannot be found out for this reason; 0 for no reason.
 int fail(int error)
 {
     if (error != 0)
@@ -145,8 +145,7 @@ TEST_F(FallbackSignature, RaisesTheReasonForWhichTheHostsNameFails)
         {
             EXPECT_EQ(exception.code().value(), error);
             EXPECT_EQ(exception.code().category(), boost::system::system_category());
-            // Nothing of its own stands before the reason; later releases of Boost tell the code
-            // behind it.
+            // Nothing is before the reason; later releases of Boost append the code.
             EXPECT_THAT(exception.what(), StartsWith(exception.code().message()));
         }
     }

@@ -95,7 +95,7 @@ const StateCase stateCases[] = {
 INSTANTIATE_TEST_SUITE_P(TheFile, StateOf, testing::ValuesIn(stateCases),
                          [](const auto &row) { return row.param.sentence; });
 
-/// libgit2 tells one path, the old one, and nothing but the renaming.
+/// libgit2 reports only the renaming, with the old path.
 TEST_F(FileStates, OfAStagedRenamingIsUnknownUnderOnePath)
 {
     repository_.write("long", std::string(1000, 'x') + "\n");
@@ -124,7 +124,7 @@ TEST_F(FileStates, OfAFileThatBecameALinkIsUnknown)
 {
     repository_.remove("file");
     repository_.symlink("nowhere", "file");
-    // In a list of names a link stands for its target, a dangling one for itself.
+    // In a list of names a link means its target, or itself if the target does not exist.
     EXPECT_EQ(allStates(repository_).at("file"), "Unknown");
     repository_.add({"file"});
     EXPECT_EQ(allStates(repository_).at("file"), "Unknown");

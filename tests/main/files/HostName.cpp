@@ -39,7 +39,7 @@ HostName::~HostName()
 
 } // namespace vclink::test
 
-// The C library declares both of them so that they raise nothing.
+// The C library declares that neither of them throws.
 int gethostname(char *buffer, std::size_t size) noexcept
 {
     if (current == nullptr)

@@ -42,7 +42,7 @@ TEST_F(MarkResolved, PutsWhatStandsOrItsAbsenceIntoThePlaceOfAConflict)
 }
 
 /// A merge in which one side deleted "file" and the other edited it: whether ours did, whether the
-/// file stands when it is marked, and what git's status is then.
+/// file exists when it is marked, and what git's status is then.
 struct DeletionRow : Sentence
 {
     bool isOurs;
@@ -165,7 +165,7 @@ TEST_F(MarkResolved, TakesALinkForItsTarget)
     EXPECT_THAT(status(), ElementsAre(" M file", " M link", "M  other"));
 }
 
-/// Whether something stands there is asked of the link's target.
+/// The link's target decides whether the file exists.
 TEST_F(MarkResolved, TakesALinkThatLeadsNowhereForAnAbsence)
 {
     repository_.symlink("nowhere", "link");

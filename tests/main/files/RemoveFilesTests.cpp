@@ -209,7 +209,7 @@ TEST_F(RemoveFiles, TakesALinkForItsTarget)
     EXPECT_THAT(status(), ElementsAre("D  file", "?? file"));
 }
 
-/// The files that the folder stands for are looked up by name once more.
+/// The files in the folder are looked up by name again.
 TEST_F(RemoveFiles, TakesALinkAmongTheFilesOfAFolderForItsTarget)
 {
     repository_.symlink("../file", "sub/link");
@@ -239,7 +239,8 @@ TEST_F(RemoveFiles, RemovesASubmoduleAndLeavesItsFiles)
     EXPECT_EQ(repository_.read("module/file"), "x");
 }
 
-/// Of a renaming that is asked for as a whole only the old path is told, which the index has lost.
+/// If both names of a renaming are listed, only the old path is reported, which the index does not
+/// have.
 TEST_F(RemoveFiles, DoesNothingForBothPathsOfAStagedRenaming)
 {
     repository_.git({"mv", "file", "renamed"});

@@ -15,8 +15,7 @@ namespace fs = std::filesystem;
 using testing::ElementsAre;
 using namespace vclink::test;
 
-/// Reverts where more than a file's content was changed: its mode, its line ends, or what stands
-/// there at all.
+/// Reverts if more than the content of a file was changed: its mode, its line ends, or its kind.
 class RevertedKinds : public StagingFixture
 {
 };

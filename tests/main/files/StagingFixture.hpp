@@ -19,8 +19,8 @@
 namespace vclink::test
 {
 
-/// Expects that `action` raises exactly the class of the identifier, with these paths as the report
-/// that is its argument.
+/// Expects that `action` throws exactly the class of the identifier, with a report of these paths
+/// as its argument.
 template <class Tag>
 void expectRefusal(const std::vector<std::string> &paths, const std::function<void()> &action)
 {
@@ -68,7 +68,7 @@ class StagingFixture : public AdapterFixture
     /// What the repository would be after these commands of git, run on a copy.
     RepositoryState stateAfterGit(const std::vector<std::vector<std::string>> &commands) const;
 
-    /// The LibGit2Exception that `action` raises in a process without privileges, as text.
+    /// The LibGit2Exception that `action` throws in a process without privileges, as text.
     std::string unprivilegedFailureOf(const std::function<void()> &action) const;
     /// Makes the unprivileged user the owner of the test's folder, and git and libgit2 put up with
     /// it.

@@ -71,7 +71,7 @@ class StatusWalk : public AdapterFixture
                            adapter_->getFolderStates(adapter_->getRootFolder()));
     }
 
-    /// Lets the walk raise in its callback after `count` paths.
+    /// Makes the walk throw in its callback after `count` paths.
     void raiseAfter(int count, std::function<void()> raise)
     {
         throwing_.left = count;
@@ -205,7 +205,7 @@ TEST_F(StatusWalk, LeavesAnExceptionOfAnyKindFound)
 }
 
 #ifdef __clang__
-// clang's text of a lambda tells the arguments' types only.
+// clang's text of a lambda has only the arguments' types.
 constexpr const char *traceOfTheCallback = "makeCallbackImpl";
 #else
 constexpr const char *traceOfTheCallback = "StatusCallbacks::status";

@@ -95,7 +95,7 @@ class InterruptedMerge : public MergeFixture
         EXPECT_EQ(repository_.read(".git/HEAD"), "ref: refs/heads/main\n");
         EXPECT_FALSE(exists(".git/MERGE_HEAD"));
     }
-    /// The commands that the text of a refused commit tells to run.
+    /// The commands in the text of a refused commit.
     std::string wayOut() const
     {
         const std::string text = failureOf([this] { commit(); }).text;

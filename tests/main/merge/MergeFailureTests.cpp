@@ -31,7 +31,7 @@ using testing::IsEmpty;
 using namespace vclink::test;
 using vclink::util::exception::CancelledOperationException;
 
-/// Every cause comes out as one kind of exception, whose added text tells it.
+/// Every cause becomes the same kind of exception, with the cause as added text.
 class MergeFailure : public MergeFixture
 {
   protected:

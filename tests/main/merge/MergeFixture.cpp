@@ -24,7 +24,7 @@ auto members(const MergeOutcome &outcome)
                     outcome.workingTree);
 }
 
-/// Cuts what stands behind each run of these seven characters and a blank, up to the line's end.
+/// Removes what follows seven of these characters and a blank, up to the end of the line.
 void cutLabels(std::string &text, const std::string &marker)
 {
     for (auto at = text.find(marker); at != std::string::npos; at = text.find(marker, at + 1))

@@ -40,8 +40,8 @@ class MergeFixture : public BranchFixture
     {
         branches().merge(name);
     }
-    /// The added text of the GitException that merge() raises; the test fails when it raises
-    /// anything else, or not the message MergeFailed with the name as its one argument.
+    /// The added text of the GitException that merge() throws. The test fails if it throws anything
+    /// else, or another message than MergeFailed with the name as its only argument.
     std::string failureOfMerge(const std::string &name) const;
     /// failureOfMerge(), expecting the text of HasConflicts.
     void expectConflicts(const std::string &name) const;

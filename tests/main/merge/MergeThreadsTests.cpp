@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: MIT
 // Merges with a command on two threads at once, as a host may run them: guards begin and end
-// between merges, never meanwhile.
+// between merges, never during one.
 #include <array>
 #include <future>
 #include <memory>
@@ -87,8 +87,8 @@ class MergeThreads : public GitFixture
     /// @return how each merge ended, "" for well
     std::array<std::string, 2> mergeInBoth()
     {
-        // libgit2 is started by the threads. Where it ends before a thread that has used it, it
-        // does not release what it keeps for that thread.
+        // libgit2 is started by the threads. If it ends before a thread that has used it, it does
+        // not release what it keeps for that thread.
         std::optional<LibGit2Session> session;
         Meeting meeting;
         const auto work = [&](std::size_t number)

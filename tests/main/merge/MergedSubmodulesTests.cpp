@@ -301,7 +301,7 @@ TEST_F(MergedSubmodules, ComeToTheFolderThatABranchHasLeft)
     EXPECT_EQ(module_.read("untracked"), "mine\n");
 }
 
-/// Nothing tells the commit that is checked out in it.
+/// It is unknown which commit is checked out in it.
 TEST_F(MergedSubmodules, ComeToARepositoryWithoutACommit)
 {
     repository_.git({"branch", "topic"});

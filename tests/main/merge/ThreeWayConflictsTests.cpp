@@ -17,8 +17,8 @@ namespace
 using testing::HasSubstr;
 using namespace vclink::test;
 
-/// What each side does, what is in conflict then (stage and name), which names stand in the working
-/// copy with which content, where it is told, and what is done and committed before.
+/// What each side does, what is in conflict then (stage and name), which names the working copy
+/// has with which content, if given, and what is done and committed before.
 struct ConflictingSides : Sentence
 {
     Change ours;
@@ -140,7 +140,7 @@ TEST_F(ThreeWayConflicts, OfCrissCrossHistoriesAreAsInGit)
     expectConflictsAsGit(threeStages);
 }
 
-/// Which libgit2 sees otherwise than git; "~theirs" behind a name stands for the id of the branch.
+/// Which libgit2 sees otherwise than git; "~theirs" behind a name means the id of the branch.
 class ConflictsUnlikeGit : public ThreeWayConflicts,
                            public testing::WithParamInterface<ConflictingSides>
 {

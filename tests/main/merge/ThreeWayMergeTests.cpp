@@ -24,7 +24,7 @@ class ThreeWayMerge : public MergeFixture
 {
 };
 
-/// What each side does, what stands in the working copy then ("" for nothing), and what is done and
+/// What each side does, what the working copy holds then ("" for nothing), and what is done and
 /// committed before.
 struct CleanSides : Sentence
 {

@@ -43,7 +43,7 @@ std::string hexadecimal(const git::GitRemoteHead::Id &id)
     return git_oid_tostr_s(&raw);
 }
 
-/// A head as `git ls-remote` tells it.
+/// A head as `git ls-remote` reports it.
 std::string describe(const git::GitRemoteHead &head)
 {
     return hexadecimal(head.oid) + '\t' + head.name;

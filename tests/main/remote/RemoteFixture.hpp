@@ -49,7 +49,7 @@ class RemoteFixture : public BranchFixture
     std::string publish(const std::string &name, const std::string &bytes);
     /// The working copy commits a file.
     std::string commit(const std::string &name, const std::string &bytes);
-    /// Every reference with what it names, as git tells it.
+    /// Every reference and its object, as git reports it.
     static std::vector<std::string> references(const GitRepository &repository);
     /// A copy of the working copy as it is now, for git to work on.
     GitRepository twin() const;

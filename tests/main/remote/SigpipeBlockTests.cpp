@@ -45,8 +45,8 @@ class Descriptor
     int number_;
 };
 
-/// A connection over loopback that the other side has reset, told in the way of a server that goes
-/// away with data unread.
+/// A connection over loopback that the other side has reset, like a server that ends with unread
+/// data.
 class ResetConnection
 {
   public:

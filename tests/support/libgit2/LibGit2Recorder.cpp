@@ -83,7 +83,7 @@ void Passing::leaveText() const
 {
     const std::string_view name = function_;
     // libgit2 looks at what is left in a callback. After its end nothing can be left. What making a
-    // commit leaves is all that tells of a full disk.
+    // commit leaves is the only sign of a full disk.
     if (depth > 1 || name == "git_libgit2_shutdown" || name == "git_commit_create")
         return;
     const Unseen unseen;

@@ -95,10 +95,10 @@ class Passing;
 ///               (Failure{GIT_ELOCKED, GIT_ERROR_OS, injectedText}));
 ///
 /// The functions are those that the library's objects call, so a call that is new in the library is
-/// followed as soon as it is built. Naming another function fails the test: nothing would come of
-/// it. The tests' own calls of these functions are followed as well, but not those that hooks make.
-/// What libgit2 calls of itself is not seen. Only the calls of the thread that made the recorder
-/// are seen, and one recorder lives at a time. Its end puts everything back.
+/// followed as soon as it is built. Naming another function fails the test, because it would have
+/// no effect. The tests' own calls of these functions are followed as well, but not those that
+/// hooks make. What libgit2 calls of itself is not seen. Only the calls of the thread that made the
+/// recorder are seen, and one recorder lives at a time. Its end puts everything back.
 class LibGit2Recorder
 {
   public:
@@ -143,7 +143,7 @@ class LibGit2Recorder
     /// Forgets the calls, but not the handles that are open.
     void clear();
 
-    /// Lets these calls fail, and no others any more. Where several apply, the first does.
+    /// Makes these calls fail, and no others any more. If several apply, the first one does.
     void fail(std::vector<LibGit2Fault> faults);
 
     /// Called with the name of each call, before anything else is done about it.

@@ -70,7 +70,7 @@ bool isRelease(std::string_view function)
            function.substr(function.size() - ending.size()) == ending;
 }
 
-/// What stands for a function of libgit2.
+/// The replacement of a function of libgit2.
 template <class Function> struct Shim;
 template <class Result, class... Arguments> struct Shim<Result(Arguments...)>
 {

@@ -44,7 +44,7 @@ class ProgramLookup : public vclink::test::RunCommandFixture
             fs::permissions(path, fs::perms::owner_read | fs::perms::owner_write);
     }
 
-    /// Sets PATH, every '@' standing for the fixture's folder.
+    /// Sets PATH, with every '@' replaced by the fixture's folder.
     void setPath(const std::string &pattern)
     {
         std::string path;

@@ -17,7 +17,7 @@ namespace vclink::test
 struct RunOutcome
 {
     int result = -1;
-    /// without value unless the run raised boost::process::process_error
+    /// without value unless the run threw boost::process::process_error
     std::error_code error;
 };
 
@@ -28,7 +28,7 @@ class RunCommandFixture : public GitFixture
     /// Runs a command, and checks that nothing stays behind.
     RunOutcome run(const std::string &command,
                    const std::map<std::string, std::string> &placeholders = {}) const;
-    /// Runs a command that must not raise.
+    /// Runs a command that must not throw.
     int resultOf(const std::string &command,
                  const std::map<std::string, std::string> &placeholders = {}) const;
     /// The records that a run of the command leaves in the log.

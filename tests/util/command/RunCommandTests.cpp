@@ -58,7 +58,7 @@ TEST_F(RunCommand, SplitsTheCommandIntoTheseWords)
         const char *command;
         std::vector<std::string> words;
     } rows[] = {
-        // Without placeholders as it stands.
+        // Unchanged without placeholders.
         {"%T %A 100% %", {"%A", "100%", "%"}},
         // At blanks outside double quotes only.
         {"%T a \"b c\" d", {"a", "b c", "d"}},

@@ -200,7 +200,7 @@ TEST_F(ExactPathspec, ReplacesOnlyWhatMeansSomethingElse)
     EXPECT_EQ(escapeExactPathspec(" a "), " a[^//\x01-\x1F\\!-\xFF]");
 }
 
-/// libgit2 compares a pattern as it stands, too.
+/// libgit2 also compares a pattern literally.
 TEST_F(ExactPathspec, IsNoNameOfAnotherFile)
 {
     for (const auto &name : wildcardNames)
