@@ -7,6 +7,7 @@
 #include <cstring>
 #include <string_view>
 
+#include <boost/filesystem/exception.hpp>
 #include <boost/filesystem/operations.hpp>
 
 #include "error/errorUtil/gitString.hpp"
