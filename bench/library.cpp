@@ -51,7 +51,8 @@ void measureProbe(const upath &folder, bool holdGuard)
 /// Compares neighbours, as an insertion at the end of a map does. The entries are the comparisons.
 void measureLess(const std::vector<upath> &paths)
 {
-    const FileStateMap::key_compare less;
+    // NOLINTNEXTLINE(modernize-use-transparent-functors): less<> compares with operator<
+    const std::less<upath> less;
     std::size_t comparisons = 0;
     std::size_t ascending = 0;
     beginRegion();
