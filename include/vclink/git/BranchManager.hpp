@@ -19,15 +19,16 @@ namespace vclink::git
 ///
 /// Each operation opens the repository of the adapter, runs to its end on the calling thread, and
 /// keeps nothing. Names and revisions are UTF-8. Use it on one thread at a time, the adapter's. The
-/// order of the operations is binding.
+/// order of the operations is part of the binary interface.
 ///
 /// Unless its description says otherwise, an operation throws LibGit2Exception with libgit2's text
 /// if a call to libgit2 fails, and then nothing has changed. A name or revision with a NUL
 /// character throws with GIT_EINVALIDSPEC before anything is opened.
 ///
 /// switchBranch and merge hold git's index lock while they work. If something else holds it, they
-/// throw with GIT_ELOCKED before anything is written. If a reference is locked, an operation tries
-/// again for `core.filesRefLockTimeout` milliseconds: 100 by default, one minute if negative.
+/// throw with GIT_ELOCKED before anything is written. If another process has locked a reference, an
+/// operation tries again for `core.filesRefLockTimeout` milliseconds: 100 by default, one minute if
+/// negative.
 class VCLINK_GIT_EXPORT BranchManager
 {
   public:
@@ -59,14 +60,17 @@ class VCLINK_GIT_EXPORT BranchManager
     /// Returns the same id as 20 bytes.
     virtual git_oid getRevisionId(const std::string &revision) const = 0;
 
-    /// Checks out a local branch and moves HEAD to it. Reports progress.
+    /// Makes a local branch the current one: checks out its files and moves HEAD to it. Reports
+    /// progress.
     ///
     /// Refuses before anything is written if it would lose uncommitted changes, staged or not, or
     /// untracked files, and if a symbolic link, FIFO, socket or device is in the way. Also refuses
     /// if a submodule would become a file or a folder while its folder contains files. Overwrites
-    /// an ignored file that the branch tracks. Keeps changes in files that the branch does not
-    /// touch, and the folders of submodules, even if the branch does not have them. If a tag has
-    /// the same name, its tree is checked out.
+    /// an ignored file that the branch tracks. Keeps changes in files that are the same in both
+    /// branches, and the folders of submodules, even if the branch does not have them.
+    ///
+    /// If a tag has the same name as the branch, the files of the tag are checked out, and HEAD
+    /// moves to the branch.
     ///
     /// After a failure or a cancellation HEAD is unchanged. The files are too, unless one of them,
     /// or HEAD itself, could not be written. git_branch_lookup, git_revparse_single,
@@ -80,8 +84,8 @@ class VCLINK_GIT_EXPORT BranchManager
     /// git_branch_create.
     virtual void createBranch(const BranchParameters &parameters) = 0;
 
-    /// Deletes a local branch, merged or not. Fails for the branch that HEAD points to.
-    /// git_branch_delete.
+    /// Deletes a local branch, merged or not. No reference leads to commits that only this branch
+    /// had. Fails for the current branch. git_branch_delete.
     virtual void deleteBranch(const BranchName &name) = 0;
 
     /// Returns the short name of the current branch, which HEAD points to. Fails if the repository
@@ -100,8 +104,8 @@ class VCLINK_GIT_EXPORT BranchManager
     /// - if it would overwrite an untracked file, or
     /// - if a symbolic link, FIFO, socket or device is in the way.
     ///
-    /// The merge drivers may have run by then. The added text names the first file, except if the
-    /// merge itself touches it: libgit2 only counts such files.
+    /// The merge drivers may have run by then. The added text names the first such file. If the
+    /// merge changes that file too, the text has only libgit2's number of such files.
     ///
     /// Restores missing files and overwrites ignored ones. Keeps the folders of submodules; the
     /// merge commit records the submodules' commits as merged, whatever is checked out in them.
@@ -109,8 +113,8 @@ class VCLINK_GIT_EXPORT BranchManager
     /// After conflicts the repository is in the state of a merge: continue with
     /// CMAdapter::markResolved and CMAdapter::commit. Files in conflict have markers if both sides
     /// changed the same lines. A file that a merge command refused can be a mix of both sides
-    /// without markers. Files whose content must not be mixed have our version. git_merge_analysis,
-    /// git_checkout_tree, git_merge.
+    /// without markers. Files with the attribute `-merge`, or with `-text` and a driver's name,
+    /// have our version. git_merge_analysis, git_checkout_tree, git_merge.
     /// @param name the branch, or any revision text; "tag^{commit}" for an annotated tag
     /// @throws GitException with the message shared_vclink::git::MergeFailed for every failure,
     /// including cancellation and conflicts; the added text has the cause

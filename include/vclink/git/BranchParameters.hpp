@@ -14,7 +14,8 @@ class VCLINK_GIT_EXPORT BranchParameters
   public:
     /// Creates the value.
     /// @param name the branch's short name, UTF-8
-    /// @param startPoint the name of a reference that points directly to a commit, UTF-8
+    /// @param startPoint the name of a reference to a commit, UTF-8, e.g. "HEAD" or "origin/main";
+    /// not an object id, and not an annotated tag
     BranchParameters(const std::string &name, const std::string &startPoint);
 
     /// Returns the branch's short name.

@@ -25,23 +25,27 @@ namespace vclink::git
 /// cannot be opened or a call to libgit2 fails.
 ///
 /// Lists of files: a file outside the working copy, or one that Git does not know, matches nothing.
-/// The characters '*', '?' and '[' in a name act as patterns. A symbolic link means its target, or
-/// itself if the target does not exist. A folder means everything below it, except the root, which
-/// matches nothing: list its content, or use getFolderStates for states. An operation throws
+/// In a name the characters '*', '?' and '[' act as patterns, so other files can match too, and a
+/// backslash acts as a slash. A symbolic link means its target, or itself if the target does not
+/// exist. A folder means everything below it, except the root, which matches nothing: list its
+/// content, or use getFolderStates for states. An operation throws
 /// boost::filesystem::filesystem_error if a path cannot be resolved, and LibGit2Exception with
 /// GIT_EINVALIDSPEC, before anything is opened, if a path or the root has a NUL character.
 ///
-/// The index on disk is written completely or not at all. Operations that change it hold git's
-/// lock, `index.lock`, from before they read it. If something else holds the lock, including
-/// another operation of this process, they throw LibGit2Exception with the code GIT_ELOCKED and the
-/// lock's name, and change nothing. The library never removes a lock of others.
+/// The index on disk, Git's list of files for the next commit, is written completely or not at all.
+/// Operations that change it hold git's lock, `index.lock`, from before they read it. If something
+/// else holds the lock, including another operation of this process, they throw LibGit2Exception
+/// with the code GIT_ELOCKED and the lock's name, and change nothing. The library never removes a
+/// lock of others.
 ///
 /// @section adapter_getFileStates getFileStates
-/// Returns the states of the listed files, with one walk for the whole list. If libgit2 cannot read
-/// the working copy, the result is empty and nothing is thrown, as for a bare repository. libgit2
-/// reads everything before it reports the first state, so a result is incomplete only if memory
-/// runs out. Files that Git ignores, and files that neither exist nor are known to Git, are not in
-/// the result. An empty list returns an empty map and opens nothing. git_status_foreach_ext.
+/// Returns the states of the listed files, with one walk for the whole list. Files that Git
+/// ignores, and files that neither exist nor are known to Git, are not in the result. An empty list
+/// returns an empty map and opens nothing.
+///
+/// If libgit2 cannot read the working copy, the result is empty and nothing is thrown, as for a
+/// bare repository. A result is incomplete only if memory runs out, because libgit2 reads
+/// everything before it reports the first state. git_status_foreach_ext.
 ///
 /// @section adapter_getFolderStates getFolderStates
 /// Returns the states of all files below a folder, without ignored ones. A working copy that
@@ -57,34 +61,36 @@ namespace vclink::git
 /// shared_vclink::git::NoFilesToRemove if no file is left to remove. git_index_remove_all.
 ///
 /// @section adapter_markResolved markResolved
-/// Marks a conflict in a file as resolved. Replaces the entries of the file in the index, with or
-/// without a conflict, by the current file. Removes them if the file does not exist. A link without
-/// a target counts as missing. git_index_add_all, git_index_remove_all.
+/// Marks a conflict in a file as resolved: stages the current file, whatever the index has for it.
+/// If the file does not exist, or is a link without a target, stages its deletion.
+/// git_index_add_all, git_index_remove_all.
 ///
 /// @section adapter_commit commit
-/// Commits every tracked file as it is on disk, staged or not, on HEAD, and concludes a merge or
-/// any other operation under way. Files in conflict are committed as they are, including markers.
-/// Makes a commit even if nothing has changed. The first argument is ignored. The message is used
-/// unchanged, up to the first NUL. The author is that of `user.name` and `user.email`, otherwise
-/// "USER" or "LOGNAME" at the host's name. Throws the exception of shared_vclink::git::NoUserName
-/// if there is neither, and boost::system::system_error if the host's name cannot be found out.
+/// Commits all tracked files as they are on disk, staged or not, on the current branch, and ends a
+/// merge or any other operation under way. Files in conflict are committed as they are, including
+/// markers. Makes a commit even if nothing has changed. The first argument is ignored. The message
+/// is used unchanged, up to the first NUL. The author is that of `user.name` and `user.email`,
+/// otherwise "USER" or "LOGNAME" at the machine's name. Throws the exception of
+/// shared_vclink::git::NoUserName if there is neither, and boost::system::system_error if the
+/// machine's name cannot be found out.
 ///
 /// A file that a sparse checkout leaves out stays as in the index; a file that cannot be read makes
-/// the commit fail. If the branch is locked, the commit tries again for
+/// the commit fail. If another process has locked the branch, the commit tries again for
 /// `core.filesRefLockTimeout` milliseconds, 100 by default. It refuses to conclude a merge whose
 /// process was killed, with the class GIT_ERROR_MERGE and a text that describes what to do; nothing
 /// has changed then.
 ///
-/// After a failure HEAD and the state of a merge are as before, and the changes may be in the
-/// index. The commit exists only if the state cannot be cleaned up, or if the new commit cannot be
-/// read. git_index_update_all, git_commit_create, git_repository_state_cleanup.
+/// After a failure HEAD and the state of a merge are as before, and the changes may be staged. In
+/// two cases the commit exists although an exception is thrown: if the state of the merge cannot be
+/// removed, or if the new commit cannot be read again. git_index_update_all, git_commit_create,
+/// git_repository_state_cleanup.
 ///
 /// @section adapter_revertFiles revertFiles
 /// Discards all changes to the files, staged or not, and restores missing files. As in git, deletes
-/// what is in the place of a listed file, including a folder with all its content, and replaces
-/// symbolic links, FIFOs, sockets and devices. A file that HEAD does not have is removed from the
-/// index and stays on disk. If some files are in conflict, changes nothing and throws the exception
-/// of shared_vclink::git::Conflicted, which lists them.
+/// what is in the place of a listed file: a folder with all its content, a symbolic link, a FIFO, a
+/// socket or a device. A file that HEAD, the last commit, does not have is removed from the index
+/// and stays on disk. If some files are in conflict, changes nothing and throws the exception of
+/// shared_vclink::git::Conflicted, which lists them.
 ///
 /// Reports progress. Throws vclink::util::exception::CancelledOperationException if the application
 /// requests it before the first file is written; then the index entries of the files are those of

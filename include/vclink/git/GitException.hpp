@@ -37,14 +37,14 @@ class VCLINK_GIT_EXPORT GitException : public foundation::core::except::IMsgIDEx
 
     /// Returns a copy on the heap. The caller owns it.
     [[nodiscard]] const GitException *clone() const override;
-    /// Throws a copy of this class.
+    /// Throws a copy whose type is GitException.
     void rethrow() const override;
 
     /// Returns the text in UTF-8, as foundation::core::except::IException::what() does. Logs the
     /// stack first if stack traces are enabled.
     const char *what() const noexcept override;
 
-    /// Returns catalogue + ":" + key of the message.
+    /// Returns catalogue and key of the message, e.g. "shared_vclink:git:MergeFailed".
     std::string GetID() const override;
     /// Returns the message's text, followed by a line feed and the added text if there is one.
     ustring GetUnicodeMessageTxt() const override;

@@ -16,9 +16,10 @@
 namespace vclink::git
 {
 
-/// Creates the option values of the operations. A host that needs other values derives from it. The
-/// order of the virtual operations is binding. The two factories provided here hold nothing that
-/// changes, and throw only std::bad_alloc.
+/// Creates the option values of the operations. A host that needs other values for clones derives
+/// from it and passes it to GitWorkingCopyGenerator, which asks it for the CloneOptions. Adapters
+/// always use makeDefault(). The order of the virtual operations is part of the binary interface.
+/// The two factories provided here hold nothing that changes, and throw only std::bad_alloc.
 class VCLINK_GIT_EXPORT GitOptionsFactory
 {
   public:

@@ -18,13 +18,13 @@ namespace vclink::git
 /// Each operation opens the repository of the adapter, looks up the remote in its configuration,
 /// connects, runs to its end on the calling thread and keeps nothing: no connection stays open
 /// between two calls. Use it on one thread at a time, the adapter's. The order of the operations is
-/// binding.
+/// part of the binary interface.
 ///
 /// Every certificate and every host key is accepted: anyone who intercepts the connection can read
-/// and modify it. There is no time limit: a silent remote blocks the operation. Plain paths,
-/// file://, git://, http://, https:// and ssh:// work as in libgit2. The only credentials are the
-/// keys of the ssh agent that SSH_AUTH_SOCK names, with the user in the URL, and a password in the
-/// URL. Nobody is prompted. No proxy is used.
+/// and modify it. There is no time limit: a silent remote blocks the operation, which cannot be
+/// cancelled then. Plain paths, file://, git://, http://, https:// and ssh:// work as in libgit2.
+/// The only credentials are the keys of the ssh agent that SSH_AUTH_SOCK names, with the user in
+/// the URL, and a password in the URL. Nobody is prompted. No proxy is used.
 ///
 /// Each operation throws LibGit2Exception with libgit2's text if a call to libgit2 fails, for
 /// example if the repository does not have the remote, or if the remote cannot be reached or
@@ -51,8 +51,9 @@ class VCLINK_GIT_EXPORT GitRemote
     /// remote-tracking branches.
     ///
     /// Also downloads the tags that point to downloaded objects, and all tags of a repository on
-    /// this machine. Keeps branches that the remote has deleted, unless its `prune` is configured.
-    /// Does not change the working tree, the index and local branches, unless a refspec names one.
+    /// this machine. Keeps remote-tracking branches that the remote has deleted, unless its `prune`
+    /// is configured. Does not change the working tree and the index, and changes a local branch
+    /// only if a refspec names it.
     ///
     /// After a failure or a cancellation some objects may have been downloaded and some references
     /// moved. A cancellation request that ended a fetch also stops the next checkout of the adapter

@@ -21,7 +21,7 @@ class VCLINK_GIT_EXPORT LibGit2Exception : public GitException
 
     /// Returns a copy on the heap. The caller owns it.
     [[nodiscard]] const LibGit2Exception *clone() const override;
-    /// Throws a copy of this class.
+    /// Throws a copy whose type is LibGit2Exception.
     void rethrow() const override;
 
     /// Returns the failure, which lives as long as the exception.

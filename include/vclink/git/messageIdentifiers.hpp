@@ -85,7 +85,7 @@ class VCLINK_GIT_EXPORT MergeFailed : public resource_core::BaseMsgID
     ~MergeFailed() override;
 };
 
-/// A merge left conflicts.
+/// A merge left conflicts. Hosts get only its text, as added text of MergeFailed.
 class VCLINK_GIT_EXPORT HasConflicts : public resource_core::BaseMsgID
 {
   public:
@@ -94,7 +94,8 @@ class VCLINK_GIT_EXPORT HasConflicts : public resource_core::BaseMsgID
     ~HasConflicts() override;
 };
 
-/// A merge was requested while another operation is in progress.
+/// A merge was requested while another operation is in progress. Hosts get only its text, as added
+/// text of MergeFailed.
 class VCLINK_GIT_EXPORT UnableToMergeBadRepositoryState : public resource_core::BaseMsgID
 {
   public:
@@ -103,7 +104,8 @@ class VCLINK_GIT_EXPORT UnableToMergeBadRepositoryState : public resource_core::
     ~UnableToMergeBadRepositoryState() override;
 };
 
-/// The configuration allows only fast-forwards, and the branches need a merge commit.
+/// The configuration allows only fast-forwards, and the branches need a merge commit. Hosts get
+/// only its text, as added text of MergeFailed.
 class VCLINK_GIT_EXPORT MergePreferenceFastForward : public resource_core::BaseMsgID
 {
   public:
@@ -116,7 +118,7 @@ class VCLINK_GIT_EXPORT MergePreferenceFastForward : public resource_core::BaseM
 class VCLINK_GIT_EXPORT AlreadyAdded : public resource_core::BaseMsgID
 {
   public:
-    /// @param files the report of the files
+    /// @param files the files, one path a line
     template <class Text>
     explicit AlreadyAdded(const Text &files)
         : BaseMsgID(detail::makeArguments(files), detail::catalogue, "AlreadyAdded")
@@ -139,7 +141,7 @@ class VCLINK_GIT_EXPORT NoFilesToRemove : public resource_core::BaseMsgID
 class VCLINK_GIT_EXPORT Conflicted : public resource_core::BaseMsgID
 {
   public:
-    /// @param files the report of the files
+    /// @param files the files, one path a line
     template <class Text>
     explicit Conflicted(const Text &files)
         : BaseMsgID(detail::makeArguments(files), detail::catalogue, "Conflicted")
