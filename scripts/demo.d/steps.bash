@@ -1,7 +1,7 @@
 # SPDX-License-Identifier: MIT
 # shellcheck shell=bash disable=SC2154
-# What the parts of the demonstration have in common. To be sourced by a script that then sets
-# `shell`, the program that is shown, and `answer`, a file for what it says.
+# Functions that all parts of the demonstration use. The script that sources this file then sets `shell`, the
+# program to show, and `answer`, a file for its output.
 
 fail()
 {
@@ -14,7 +14,7 @@ say()
     printf '\n%s\n' "$*"
 }
 
-# run_in FOLDER PROMPT STATUS ARGUMENT...: shows the command, and what it says.
+# run_in FOLDER PROMPT STATUS ARGUMENT...: shows a command and its output. Fails if its status is not STATUS.
 run_in()
 {
     local folder=$1 prompt=$2 wanted=$3 status=0 shown
@@ -26,7 +26,7 @@ run_in()
     ((status == wanted)) || fail "vclink-shell$shown ended with $status, not with $wanted"
 }
 
-# expect WORDS ACTUAL WANTED
+# expect WORDS ACTUAL WANTED: fails if both texts differ.
 expect()
 {
     if [[ $2 != "$3" ]]; then

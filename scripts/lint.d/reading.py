@@ -1,5 +1,5 @@
 # SPDX-License-Identifier: MIT
-"""Has clang-tidy read units, several in one go where that is as good, and remembers clean ones."""
+"""Runs clang-tidy on units, on several at once if that is as good, and remembers clean ones."""
 
 import hashlib
 import os
@@ -10,8 +10,8 @@ import subprocess
 import threading
 import time
 
-# Checks of the compiled file and not of what it includes: they read each changed unit by itself. All
-# others have the same remarks on units that are read together.
+# These checks examine the compiled file only, not what it includes, so each changed unit is read by itself. All
+# other checks find the same in units that are read together.
 OF_THE_UNIT = ("misc-unused-alias-decls", "misc-unused-using-decls")
 ALONE, TOGETHER = "alone", "together"
 MOST_TOGETHER = 20
@@ -21,7 +21,7 @@ REMARK = re.compile(r"^(/.*?):\d+:\d+: (?:warning|error|fatal error): .*?(\[[^\]
 
 
 class Clean:
-    """Keys of units without remarks, a file each, in a folder that outlives the tree."""
+    """Keys of clean units: one file for each key, in a folder outside the working tree."""
 
     def __init__(self, folder):
         self.folder = folder
@@ -76,7 +76,7 @@ class Reader:
         self.lock = threading.Lock()
         self._checks = {}
         shutil.rmtree(folder, ignore_errors=True)
-        # A unit made here has the configuration of its members' folder.
+        # A joined unit must have the configuration of its members' folder.
         for unit in project.units:
             for file in project.own_configurations(unit):
                 copy = os.path.join(folder, project.name(file))
@@ -85,7 +85,7 @@ class Reader:
                     shutil.copyfile(file, copy)
 
     def remember(self, unit):
-        """The unit's key, and what its files are now."""
+        """Stores the unit's key and the current state of its files. Returns the key."""
         self.seen[unit] = self._state(unit)
         self.keys[unit] = self.project.key(unit, self.version)
         return self.keys[unit]
@@ -107,7 +107,7 @@ class Reader:
                 self.clean.add(self.keys[unit], way)
 
     def read_whole(self, unit):
-        """All checks on one unit."""
+        """Runs all checks on one unit."""
         output = self._run(unit, unit.source)
         if output is None:
             self._found_clean(unit, ALONE, TOGETHER)
@@ -115,7 +115,7 @@ class Reader:
             self._tell(output)
 
     def read_alone(self, unit):
-        """What only a unit of its own shows: that it compiles, and what of it is unused."""
+        """Checks what only a single unit shows: that it compiles, and that it uses what it declares."""
         output = self._run(unit, unit.source, "--checks=" + self._checks_of_the_unit(unit))
         if output is None:
             self._found_clean(unit, ALONE)
@@ -123,7 +123,7 @@ class Reader:
             self._tell(output)
 
     def read_together(self, units):
-        """All checks on several units as one. Who is suspected is read again, as a whole."""
+        """Runs all checks on several units as one. Reads suspected ones again, one by one."""
         if len(units) == 1:
             self.read_whole(units[0])
             return
@@ -147,7 +147,7 @@ class Reader:
         for unit in suspects:
             self.read_whole(unit)
         for unit in others:
-            # What is said of a header may be due to any unit that includes it.
+            # Any unit that includes a header can be the cause of a remark on the header.
             if not headers:
                 self._found_clean(unit, TOGETHER)
             elif not headers <= self.files_told():
@@ -181,7 +181,7 @@ class Reader:
         return self._checks[folder]
 
     def _run(self, unit, source, *options):
-        """What clang-tidy says; None when it has no remark."""
+        """Returns clang-tidy's output, None if it has no remark."""
         command = ["clang-tidy", "--quiet", *options, source, "--", *unit.arguments]
         with self.lock:
             self.runs += 1
@@ -203,12 +203,12 @@ class Reader:
         return result.stdout or result.stderr or f"clang-tidy ended with {result.returncode}\n"
 
     def files_told(self):
-        """The files with remarks that have been printed."""
+        """Returns the files whose remarks have been printed."""
         with self.lock:
             return {os.path.normpath(REMARK.match(line)[1]) for line in self.said}
 
     def _tell(self, output):
-        """Prints remarks, each header's once."""
+        """Prints remarks; those on a header only once."""
         with self.lock:
             self.failed = True
             lines = output.splitlines()

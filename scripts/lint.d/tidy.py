@@ -1,6 +1,6 @@
 #!/usr/bin/env python3
 # SPDX-License-Identifier: MIT
-"""Has clang-tidy read what a change can affect. scripts/lint calls this in the folder it checks."""
+"""Runs clang-tidy on what a change can affect. scripts/lint calls this in the folder it checks."""
 
 import argparse
 import collections
@@ -54,13 +54,13 @@ def find_files():
 
 
 def find_changed(base):
-    """The files that differ from the base, those that are gone included."""
+    """Returns the files that differ from the base, including deleted ones."""
     changed = git_lines("diff", "--name-only", "--no-renames", base, "--")
     return changed | git_lines("ls-files", "--others", "--exclude-standard")
 
 
 def add_configured(changed, files):
-    """With a configuration of clang-tidy has changed all that it applies to."""
+    """Adds the files to which a changed configuration of clang-tidy applies."""
     folders = [
         os.path.dirname(name)
         for name in changed
@@ -76,9 +76,9 @@ def add_configured(changed, files):
 
 
 class Selection:
-    """Which units are to be read: those changed by themselves, and those that include a change.
+    """The units to read: changed ones, each by itself, and those that include a changed file.
 
-    What a unit includes is not always known; it is read then.
+    A unit is also read if it is unknown what it includes.
     """
 
     def __init__(self, project, changed, is_all):
@@ -92,7 +92,7 @@ class Selection:
 
 
 def add_unread(project, files, changed, folder):
-    """A unit for each changed file that no unit reads; a header is in one of its own."""
+    """Adds a unit for each changed file that no unit reads; a header gets a unit that includes it."""
     read = {path for unit in project.units for path in [unit.source, *unit.inputs]}
     added = []
     for name in sorted(files & changed):
@@ -109,7 +109,7 @@ def add_unread(project, files, changed, folder):
 
 
 def generate_missing(project, selected):
-    """Builds the files that units include and that the build makes."""
+    """Builds generated files that units include."""
     missing = {unit.missing for unit in selected if unit.missing}
     if not missing:
         return
@@ -131,7 +131,7 @@ def generate_missing(project, selected):
 
 
 def plan(project, reader, selection, jobs):
-    """What is to be done, the longest first, and how many units are known to be clean."""
+    """Returns the tasks, the longest first, and how many units are known to be clean."""
     together = collections.defaultdict(list)
     alone = []
     known = 0
@@ -149,12 +149,12 @@ def plan(project, reader, selection, jobs):
     limit = max(3, min(reading.MOST_TOGETHER, math.ceil(total / jobs)))
     groups = []
     for of_kind in together.values():
-        # A unit that consists of a header adds little to what the others include.
+        # A unit for a header adds little to what the others include.
         size = sum(0.25 if project.is_made(unit) else 1 for unit in of_kind)
         count = math.ceil(size / limit)
         groups += [of_kind[number::count] for number in range(count)]
     groups.sort(key=len, reverse=True)
-    # Who is alone in a group is read as a whole, once.
+    # A unit that is alone in a group is read once, with all checks.
     whole = {group[0] for group in groups if len(group) == 1}
     tasks = [(reader.read_together, group) for group in groups]
     tasks += [(reader.read_alone, unit) for unit in alone if unit not in whole]
@@ -164,8 +164,8 @@ def plan(project, reader, selection, jobs):
 def parse_arguments():
     parser = argparse.ArgumentParser(prog="scripts/lint.d/tidy.py", description=__doc__)
     add = parser.add_argument
-    add("--base", metavar="COMMIT", help="what has changed since then (everything)")
-    add("--no-cache", action="store_true", help="reads what is known to be clean too")
+    add("--base", metavar="COMMIT", help="reads what has changed since this commit (default: everything)")
+    add("--no-cache", action="store_true", help="also reads what is known to be clean")
     return parser.parse_args()
 
 

@@ -1,5 +1,5 @@
 # SPDX-License-Identifier: MIT
-"""How each file compiles, which files it reads, and which key names all of that."""
+"""How each file compiles, which files it reads, and a key that changes with them."""
 
 import functools
 import hashlib
@@ -10,7 +10,7 @@ import shlex
 import subprocess
 
 CONFIGURATION = ".clang-tidy"
-# Flags of code generation and linking differ between targets and change nothing for a reader.
+# Flags for code generation and linking differ between targets, and do not matter to clang-tidy.
 GENERATION = re.compile(
     r"-(f(PIC|PIE|cf-|stack-|visibility|sanitize|no-sanitize|no-omit)|g\d?$"
     r"|[DU]_FORTIFY_SOURCE|DBOOST_\w*LINK$|DBOOST_ALL_NO_LIB$)"
@@ -22,7 +22,7 @@ ERROR = re.compile(
 
 
 class Unit:
-    """A translation unit: what is compiled, how, and after scan() what it reads."""
+    """A translation unit: its source, how it compiles and, after scan(), which files it reads."""
 
     def __init__(self, source, directory, compiler, arguments):
         self.source = source
@@ -34,7 +34,7 @@ class Unit:
         self.missing = None
 
     def meaning(self):
-        """The flags that a reader has to know."""
+        """Returns the flags that matter to clang-tidy."""
         return tuple(a for a in self.arguments if not GENERATION.match(a))
 
 
@@ -59,16 +59,16 @@ class Project:
         return os.path.join(self.root, name)
 
     def name(self, path):
-        """A path as git spells it; None outside the working tree."""
+        """Returns a path as git spells it, None outside the working tree."""
         name = os.path.relpath(path, self.root)
         return None if name.startswith("..") else name
 
     def is_made(self, unit):
-        """Whether the unit is not a file of the repository; all it has is then a header's."""
+        """Returns true if the unit was made here to include a header, and is not in the repository."""
         return unit.source.startswith(self.path("build") + os.sep)
 
     def add(self, source, like):
-        """A unit for a file that no target compiles, with the flags of its nearest relative."""
+        """Adds a unit for a file that no target compiles, with the flags of a unit in a near folder."""
 
         def kinship(unit):
             return len(os.path.commonprefix([os.path.dirname(unit.source), os.path.dirname(like)]))
@@ -79,7 +79,7 @@ class Project:
         return unit
 
     def scan(self, units, scanner, jobs, folder):
-        """Finds out what each of the units reads. A file that is yet to be made counts as empty."""
+        """Finds out which files each unit reads. A generated file that does not exist yet counts as empty."""
         self._scan(units, scanner, jobs, folder)
         absent = os.path.join(folder, "absent")
         incomplete = [unit for unit in units if unit.missing]
@@ -117,7 +117,7 @@ class Project:
             names[target].scanned = True
 
     def configurations(self, unit):
-        """The configurations of clang-tidy that apply to what the unit reads."""
+        """Returns the configurations of clang-tidy that apply to the files that the unit reads."""
         found = set()
         for path in unit.inputs + [unit.source]:
             found.update(self._configurations_above(os.path.dirname(path)))
@@ -135,11 +135,11 @@ class Project:
         return (here, *above) if os.path.isfile(here) else above
 
     def kind(self, unit):
-        """Units of one kind can be read together."""
+        """Returns the unit's kind: units of one kind can be read together."""
         return self.own_configurations(unit), unit.meaning()
 
     def key(self, unit, version):
-        """Names all that decides what clang-tidy says of the unit, wherever the tree lies."""
+        """Returns a key of everything that decides clang-tidy's output, independent of the tree's path."""
         total = hashlib.sha256(version.encode())
         total.update("\0".join(unit.arguments).replace(self.root, ".").encode())
         for path in [unit.source, *unit.inputs, *self.configurations(unit)]:
@@ -149,23 +149,23 @@ class Project:
     @functools.lru_cache(maxsize=None)
     def _digest(self, path):
         if self.name(path) is None:
-            # A file of the system changes with its package.
+            # A system file changes only with its package.
             of_file = os.stat(path)
             return f"{of_file.st_size} {of_file.st_mtime_ns}"
         with open(path, "rb") as file:
             content = file.read()
-        # What CMake writes names the tree.
+        # Files that CMake writes contain the tree's path.
         return hashlib.sha256(content.replace(self.root.encode(), b".")).hexdigest()
 
 
 @functools.lru_cache(maxsize=None)
 def _real_path(escaped):
-    """The file that a rule of make names."""
+    """Returns the file that a make rule names."""
     return os.path.realpath(re.sub(r"\\(.)|\$(\$)", r"\1\2", escaped))
 
 
 def _command(entry):
-    """The compiler, and the arguments without the names of files."""
+    """Returns the compiler, and its arguments without names of files."""
     words = entry.get("arguments") or shlex.split(entry["command"])
     arguments = []
     following = iter(words[1:])

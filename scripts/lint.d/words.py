@@ -1,6 +1,6 @@
 #!/usr/bin/env python3
 # SPDX-License-Identifier: MIT
-"""Counts turns of phrase that readers stumble over, and misspelt words, by part of the repository."""
+"""Counts phrases that are hard to read, and misspelt words, for each part of the repository."""
 
 import argparse
 import collections
@@ -9,7 +9,7 @@ import re
 import subprocess
 import sys
 
-# The most turns of phrase in 1,000 words of a part.
+# The highest number of phrases in 1,000 words of a part.
 LIMIT = 1.5
 
 START = r"(?:\A\s*|[.;:|!?]\s+|\n[ ]*\n\s*)"
@@ -37,7 +37,8 @@ PHRASES = [
 ]
 
 CODE = r".*\.(?:hpp|cpp|h|c)$"
-# Parts of the repository: the first whose pattern a file's name matches, and what of the file is read.
+# Parts of the repository: a file belongs to the first part whose pattern matches its name. The last word says
+# which text of the file is read.
 TEXTS = [
     ("README", r"README\.md$", "prose"),
     ("documents", r".*\.md$", "prose"),
@@ -53,7 +54,7 @@ MESSAGES = [
     ("messages", r"host/po/.*\.pot$", "literals"),
     ("messages", r"(?:scripts|\.ci)/[^.]*$", "help"),
 ]
-# German and Japanese, inputs of fuzzing, and names that tests misspell.
+# Files that are not spelt: German and Japanese, inputs of fuzzing, and words that tests misspell.
 NOT_SPELT = r"host/po/|fuzz/corpus/|examples/.*(?:[tT]exts|language)\.cpp$|tests/shell/|tests/scripts/words\.bash|.*\.(?:png|1)$"
 IGNORED_WORDS = "commitin,nd"
 
@@ -62,7 +63,7 @@ PIECES = re.compile(r"(?P<comment>//[^\n]*|/\*.*?\*/)|R\"(?P<mark>\w*)\(.*?\)(?P
 
 
 def keep(text, spans):
-    """The text with blanks for all that is outside of the spans, so that lines keep their numbers."""
+    """Returns the text with blanks for everything outside the spans, so that lines keep their numbers."""
     kept, end = [], 0
     for start, stop in spans:
         kept.append(re.sub(r"[^\n]", " ", text[end:start]))
@@ -77,7 +78,7 @@ def blank(pattern, text, flags=0):
 
 
 def prose(text):
-    """Markdown without its code and without what scripts write."""
+    """Returns Markdown without its code and without what scripts write."""
     text = blank(r"<!-- (\w+):begin -->.*?<!-- \1:end -->", text, re.DOTALL)
     text = blank(r"^[ ]*```.*?^[ ]*```", text, re.DOTALL | re.MULTILINE)
     text = blank(r"\]\([^)]*\)|`[^`]*`", text)
@@ -90,13 +91,13 @@ def comments(text):
 
 
 def literals(text):
-    """Literals with more than one word; two with only white space between them are one."""
+    """Returns literals with more than one word."""
     pieces = [m for m in PIECES.finditer(text) if '"' in m.group()[:1] and " " in m.group()]
     return blank(r"\"|\\n", keep(text, [m.span() for m in pieces]))
 
 
 def hashes(text):
-    """Comments that begin with a hash, and Python's documentation strings."""
+    """Returns comments that begin with a hash, and Python's documentation strings."""
     spans = [m.span(1) for m in re.finditer(r'(?:^|(?<=\s))#(?!!)(\s.*)|"""(?:.*?)"""', text,
                                             re.MULTILINE) if m.group(1)]
     spans += [m.span(1) for m in re.finditer(r'"""(.*?)"""', text, re.DOTALL)]
@@ -123,14 +124,14 @@ def find_files(root):
 
 
 def count(root, names):
-    """Words of each part, and its turns of phrase: file, line, text and what to write instead."""
+    """Returns the words of each part, and its phrases: file, line, text and what to write instead."""
     words, found = {}, collections.defaultdict(list)
     for name in names:
         parts = [next(((part, reader) for part, pattern, reader in TEXTS if re.match(pattern, name)), None)]
         parts += [(part, reader) for part, pattern, reader in MESSAGES if re.match(pattern, name)]
         for part, reader in filter(None, parts):
             text = (root / name).read_text(encoding="utf-8", errors="replace")
-            # This list names them all.
+            # This file lists all phrases itself.
             if name.endswith("lint.d/words.py"):
                 continue
             text = READERS[reader](text)
@@ -144,7 +145,7 @@ def count(root, names):
 
 
 def check_spelling(root, names):
-    """Whether codespell knows no better spelling."""
+    """Returns true if codespell finds no misspelt word."""
     spelt = [name for name in names if not re.match(NOT_SPELT, name)]
     return not spelt or subprocess.run(
         ["codespell", "--ignore-words-list", IGNORED_WORDS, "--", *spelt], cwd=root).returncode == 0
@@ -152,7 +153,7 @@ def check_spelling(root, names):
 
 def main():
     parser = argparse.ArgumentParser(description=__doc__)
-    parser.add_argument("--list", action="store_true", help="print every place")
+    parser.add_argument("--list", action="store_true", help="print every place, with what to write instead")
     parser.add_argument("folder", nargs="?", default=".", type=pathlib.Path)
     options = parser.parse_args()
     names = find_files(options.folder)

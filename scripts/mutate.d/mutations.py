@@ -1,8 +1,8 @@
 # SPDX-License-Identifier: MIT
-"""Finds the places of a C++ source that can be mutated, and what each becomes.
+"""Finds the places of a C++ source that can be mutated, and the new text of each.
 
-Reads tokens, not grammar: it counts on clang-format's layout, which gives every binary operator a
-blank on both sides, and leaves it to the compiler to refuse what makes no sense.
+Reads tokens, not grammar: it relies on clang-format's layout, which has a blank on both sides of every
+binary operator. The compiler refuses mutations that make no sense.
 """
 
 import re
@@ -100,7 +100,7 @@ class Finder:
         return self.found
 
     def _match_brackets(self):
-        """For each bracket its partner, for each token its enclosing bracket."""
+        """Returns the partner of each bracket, and the enclosing bracket of each token."""
         partner, enclosing, open_ones = {}, [], []
         for index, token in enumerate(self.tokens):
             enclosing.append(open_ones[-1] if open_ones else None)
@@ -114,7 +114,7 @@ class Finder:
         return partner, enclosing
 
     def _find_functions(self):
-        """For each token whether it is in the body of a function."""
+        """Returns for each token whether it is in the body of a function."""
         inside, kinds = [], []
         for index, token in enumerate(self.tokens):
             if token.kind == "operator" and token.text == "{":
@@ -136,7 +136,7 @@ class Finder:
         return self.tokens[index].text if 0 <= index < len(self.tokens) else ""
 
     def _is_left_alone(self, index):
-        """What the compiler checks, or what no run can see: assertions, names, template lists."""
+        """Returns true for what the compiler checks or no run can see: assertions, names, template lists."""
         begin = index
         while begin > 0 and self._text(begin - 1) not in (";", "{", "}"):
             begin -= 1
@@ -240,7 +240,7 @@ class Finder:
             self._add("statement dropped", index, end, ";")
 
     def _is_guarded(self, index, end):
-        """Whether the function goes on without this statement: it depends on a condition."""
+        """Returns true if the function can continue without this statement: a condition decides about it."""
         if self._follows_condition(index):
             return self._text(end + 1) != "}"
         if self._text(end + 1) != "}":
@@ -249,14 +249,14 @@ class Finder:
         return self._follows_condition(opened) and self._text(end + 2) not in ("}", "else")
 
     def _is_expression(self, index, end):
-        """A call, an assignment or an output, as against the declaration of a name."""
+        """Returns true for a call, an assignment or an output, false for the declaration of a name."""
         position = index
         while position < end:
             text = self._text(position)
             if text in ("=", "+=", "-=", "|=", "&=", "<<", "++", "--"):
                 return True
             if text == "(":
-                # A name directly before the bracket, and none before that, calls; else declares.
+                # A call has a name directly before the bracket, and no name before that.
                 before = self.tokens[position - 2] if position - 2 >= index else None
                 if before is not None and before.kind == "name" or before and before.text in "&>":
                     return False
@@ -272,7 +272,7 @@ class Finder:
         return False
 
     def _declares(self, index):
-        """Whether a name, or a star or ampersand of a name, is there."""
+        """Returns true if a name follows, or a star or ampersand of a name."""
         token = self.tokens[index]
         if token.text in ("*", "&", "&&"):
             return not self.source[token.end].isspace()
@@ -280,7 +280,7 @@ class Finder:
 
 
 def find_mutations(file, source):
-    """All mutations of a source, in its order, each once."""
+    """Returns all mutations of a source, in its order, each once."""
     unique = {}
     for mutation in Finder(file, source).find():
         unique.setdefault((mutation.begin, mutation.end, mutation.after), mutation)

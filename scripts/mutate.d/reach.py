@@ -12,22 +12,22 @@ import subprocess
 
 import workplace
 
-# What counts as fast, of one test and of all that are tried on a mutant, as it was recorded.
+# The recorded seconds of a fast test, and of all tests that are tried on a mutant.
 TEST_SECONDS = 10
 ALL_SECONDS = 150
-# How many lines with places are looked at before and after a mutant's.
+# The number of lines before and after a mutant whose tests are tried too.
 AROUND = 3
 
 Test = collections.namedtuple("Test", "program name seconds")
 
 
 class Reach:
-    """What the programs of a workplace have recorded. A program records again only if it has changed."""
+    """The records of a workplace's programs. A program records again only if it has changed."""
 
     def __init__(self, workplace):
         self.workplace = workplace
         self.folder = os.path.join(workplace.tree, "build", "reach")
-        # By file: its lines that have a place, and for each of them the tests that reach it.
+        # For each file its lines that have a place, and for each of these the tests that reach it.
         self.lines = {}
         self.tests = collections.defaultdict(lambda: collections.defaultdict(set))
         self.all_tests = set()
@@ -40,7 +40,7 @@ class Reach:
         self.lines = {file: sorted(of_file) for file, of_file in self.tests.items()}
 
     def tests_for(self, mutation, source):
-        """The fast tests that can tell the mutant."""
+        """Returns the fast tests that can notice the mutant."""
         room = workplace.room_of(mutation.file)
         fast = [t for t in self._reaching(mutation, source) if t.seconds < TEST_SECONDS]
         fast.sort(key=lambda test: (test.seconds + (0 if room in test.program else 1), test.name))
@@ -52,10 +52,10 @@ class Reach:
         return tests
 
     def _reaching(self, mutation, source):
-        """The tests that reach a place in the mutant's lines or around.
+        """Returns the tests that reach a place in the mutant's lines or near them.
 
-        Around, because the compiler leaves out places that others imply. Outside of functions the tests
-        that reach the file; all tests if a file has no places.
+        Near them, because the compiler leaves out places that others imply. For a mutant outside functions,
+        returns the tests that reach the file, or all tests if the file has no places.
         """
         lines = self.lines.get(mutation.file)
         if lines is None:
@@ -69,7 +69,7 @@ class Reach:
         return set().union(*(of_file[line] for line in lines[begin:end]))
 
     def _size(self, program):
-        """The large ones are likely to take the longest."""
+        """Large programs are likely to take the longest."""
         return os.path.getsize(self.workplace.program(program))
 
     def _record_program(self, program):
@@ -95,14 +95,14 @@ class Reach:
                     self.tests[file_name][line].add(test)
 
     def _places(self, program, file, addresses):
-        """What _find_lines finds, which takes a while, once."""
+        """Returns the result of _find_lines, which is slow and therefore stored."""
         if not os.path.exists(file):
             found = json.dumps(self._find_lines(program, addresses))
             pathlib.Path(file).write_text(found, encoding="utf-8")
         return json.loads(pathlib.Path(file).read_text(encoding="utf-8"))
 
     def _find_lines(self, program, addresses):
-        """For each address, a number as text, the file of the tree and the line."""
+        """Returns file and line for each address."""
         answers = subprocess.run(
             ["addr2line", "-e", self.workplace.program(program)],
             input="\n".join(hex(int(address)) for address in addresses),

@@ -1,16 +1,16 @@
 # SPDX-License-Identifier: MIT
-"""Runs what a mutant may have made dangerous.
+"""Runs programs with a mutant in a sandbox.
 
-A mutated function that ends processes or removes files may do that to anything. So everything but
-one folder is read-only for it, temporary files live in a file system of their own, it sees no other
-process and no network, and no capability is left that could undo this.
+A mutated function that ends processes or removes files may end or remove anything. Therefore it can
+write only to one folder, its temporary files are in a file system of their own, it sees no other
+process and no network, and it has no capability to undo this.
 """
 
 import os
 import resource
 import subprocess
 
-# What the tests need that run as root: they change the user, and owners of files.
+# Tests that run as root need these: they change the user, and owners of files.
 CAPABILITIES = ("SETUID", "SETGID", "CHOWN", "DAC_OVERRIDE", "FOWNER", "FSETID", "KILL")
 TEMPORARY_BYTES = 1 << 29
 FILE_BYTES = 1 << 29
@@ -18,7 +18,7 @@ MEMORY_BYTES = 6 << 30
 
 
 class TimeLimit(Exception):
-    """The command was ended because its time was over."""
+    """The command was stopped because it took too long."""
 
 
 def _limit():
@@ -34,7 +34,7 @@ def _prefix(shown, writable):
     options += ["--unshare-net", "--ro-bind", "/", "/", "--dev", "/dev", "--proc", "/proc"]
     for folder in ("/tmp", "/var/tmp", "/run", "/dev/shm"):
         options += ["--perms", "1777", "--size", str(TEMPORARY_BYTES), "--tmpfs", folder]
-    # The folder may lie in what has just been hidden.
+    # The folder may be in one of the folders that are hidden now.
     options += ["--ro-bind", shown, shown]
     if writable is not None:
         options += ["--bind", writable, writable]
@@ -46,7 +46,7 @@ def _prefix(shown, writable):
 
 
 def run(command, shown, folder, seconds, writable=None, variables=None):
-    """The command's status and output. Raises TimeLimit after so many seconds."""
+    """Returns the command's status and output. Raises TimeLimit after the given seconds."""
     environment = dict(os.environ, CCACHE_DISABLE="1", **(variables or {}))
     with subprocess.Popen(
         _prefix(shown, writable) + ["--chdir", folder, "--"] + command,
@@ -61,7 +61,7 @@ def run(command, shown, folder, seconds, writable=None, variables=None):
         try:
             output, _ = process.communicate(timeout=seconds)
         except subprocess.TimeoutExpired as expired:
-            # The first process of its own kind of world: all others end with it.
+            # All other processes of the sandbox end with this one.
             process.kill()
             process.communicate()
             raise TimeLimit from expired

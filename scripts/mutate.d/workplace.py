@@ -1,5 +1,5 @@
 # SPDX-License-Identifier: MIT
-"""A copy of the tree in which one mutation after the other is made, built and tested."""
+"""A copy of the tree in which mutants are made, built and tested one after the other."""
 
 import filecmp
 import glob
@@ -14,11 +14,11 @@ import sandbox
 PRESET = "mutation"
 ROOMS = ("error", "util", "options", "main")
 FAULTS = "tests/fault/vclink_fault_libgit2_tests"
-# Times that a test may take, of what it took when it was recorded: the machine may be busy.
+# A test may take this many times its recorded time, because the machine may be busy.
 PATIENCE = 6
 START_SECONDS = 30
 BUILD_SECONDS = 1200
-# What the tests that one run of a program takes add up to, the quick ones first.
+# The recorded seconds of the tests in one run of a program; quick tests run first.
 SLICES = (0.7, 3, 12, 1e9)
 
 
@@ -56,7 +56,7 @@ class Workplace:
         self.objects = []
 
     def prepare(self):
-        """Copies the tree as it is, and builds what is not yet mutated."""
+        """Copies the tree, and builds it without a mutation."""
         self._copy_tree()
         environment = dict(os.environ)
         if shutil.which("ccache"):
@@ -75,7 +75,7 @@ class Workplace:
         return os.path.join(self.build, name)
 
     def record(self, name, file):
-        """Runs a program of tests unmutated; what each of them reaches goes to the file."""
+        """Runs a test program without a mutation, and writes what each test reaches to the file."""
         folder = os.path.dirname(file)
         pathlib.Path(file).unlink(missing_ok=True)
         status, output = sandbox.run(
@@ -92,7 +92,7 @@ class Workplace:
     def attempt(self, mutation, tests, jobs):
         """Makes the mutation and runs the tests until one fails.
 
-        Returns that one's name, or "time limit", or None when the mutant lives.
+        Returns the name of that test, or "time limit", or None if the mutant survives.
         """
         path = os.path.join(self.tree, mutation.file)
         before = pathlib.Path(path).stat()
@@ -128,7 +128,7 @@ class Workplace:
             original, copy = os.path.join(self.root, name), os.path.join(self.tree, name)
             if not os.path.isfile(copy) or not filecmp.cmp(original, copy, shallow=False):
                 os.makedirs(os.path.dirname(copy), exist_ok=True)
-                # Not with the original's time: it may be older than what was built of the last.
+                # Gives it a new time: the original's may be older than what was built from the last mutant.
                 shutil.copy(original, copy)
         for path in pathlib.Path(self.tree).rglob("*"):
             name = str(path.relative_to(self.tree))
@@ -136,15 +136,15 @@ class Workplace:
                 path.unlink()
 
     def _find_programs(self):
-        """The programs with fast tests: those of the layers, but the one of the shared library, and
-        the one that lets each call of libgit2 fail."""
+        """Returns the programs with fast tests: those of the layers, except that of the shared library,
+        and the one in which each call of libgit2 fails."""
         targets = _call(["ninja", "-C", self.build, "-t", "targets", "all"], self.tree)
         names = rf"tests/(?:{'|'.join(ROOMS)})/vclink_\w+_tests|{FAULTS}"
         found = re.findall(rf"^({names}): CXX_EX", targets, re.M)
         return sorted(name for name in found if not name.endswith("exported_tests"))
 
     def _keep_objects(self):
-        """Compilers write a new file and rename it, so that a second name keeps the old one."""
+        """Gives each object a second name. Compilers rename a new file, so this name keeps the old one."""
         shutil.rmtree(self.kept, ignore_errors=True)
         self.objects = [
             os.path.relpath(path, self.build)
@@ -165,7 +165,7 @@ class Workplace:
                 os.replace(spare, built)
 
     def _build(self, target, jobs):
-        # A program that is linked is not run by this: see the preset.
+        # The preset does not run programs after linking them.
         command = ["ninja", f"-j{jobs}", target]
         try:
             status, output = sandbox.run(
@@ -177,7 +177,7 @@ class Workplace:
             raise DoesNotCompile(output)
 
     def _slices(self, tests, room):
-        """(program, its tests, their seconds), the quick ones first, those of the room before."""
+        """Returns (program, its tests, their seconds): quick tests first, and the layer's own before others."""
         slices = []
         for name in {test.program for test in tests}:
             own = sorted((t for t in tests if t.program == name), key=lambda t: t.seconds)
