@@ -5,7 +5,8 @@
 #include <map>
 
 #include <boost/algorithm/string/replace.hpp>
-#include <boost/uuid/detail/sha1.hpp>
+
+#include "support/indexChecksum.hpp"
 
 namespace vclink::fuzz
 {
@@ -14,8 +15,6 @@ namespace
 
 namespace fs = std::filesystem;
 using test::GitRepository;
-
-constexpr std::size_t checksumSize = 20;
 
 /// Where a file of the input belongs; empty when it belongs nowhere.
 std::string placeOf(const std::string &name)
@@ -74,20 +73,6 @@ bool claimsTooMuch(const std::string &index)
             return true;
     }
     return hasManyEntries;
-}
-
-/// An index with another checksum is refused unread.
-void correctChecksum(std::string &index)
-{
-    if (index.size() < checksumSize)
-        return;
-    const std::size_t end = index.size() - checksumSize;
-    boost::uuids::detail::sha1 hash;
-    hash.process_bytes(index.data(), end);
-    boost::uuids::detail::sha1::digest_type words{};
-    hash.get_digest(words);
-    for (std::size_t i = 0; i < checksumSize; ++i)
-        index[end + i] = static_cast<char>(words[i / 4] >> (24 - i % 4 * 8));
 }
 
 void makeHistory(GitRepository &repository)
@@ -169,7 +154,7 @@ void HostileRepository::restore(const std::string &input) const
     for (auto &[name, content] : cutIntoFiles(input))
     {
         if (name == "index")
-            correctChecksum(content);
+            test::correctChecksum(content);
         else if (name == "config")
             boost::algorithm::replace_all(content, "$TOP", top().string());
         if (!placeOf(name).empty())

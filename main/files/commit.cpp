@@ -17,6 +17,7 @@
 #include "main/files/GitAdapter.hpp"
 #include "main/files/commitIdentity.hpp"
 #include "main/files/indexRefresh.hpp"
+#include "main/files/stageChangedFiles.hpp"
 #include "main/mergeState/MergeMarker.hpp"
 #include "main/mergeState/interruptedMerge.hpp"
 #include "main/mergeState/mergeHead.hpp"
@@ -122,13 +123,17 @@ void GitAdapter::refreshForCommit(git_repository *repository, git_index *index,
                                   const git_commit *head,
                                   const std::vector<const git_commit *> &parents) const
 {
+    const ChangedFiles changed(repository, index);
+    HeldEntries held;
+    // Before anything else is changed in memory: after a failure the index is read again.
+    stageChangedFiles(repository, index, changed, changed.files(), held);
     const CommitSubmodules submodules(repository, index, parents);
     submodules.resolve(index);
     if (expectedMerge_ != nullptr)
     {
         submodules.takeOut(index);
     }
-    refreshIndex(repository, index);
+    refreshIndex(repository, index, changed, held);
     // Without HEAD it is unknown which commit the user has checked out on purpose.
     const std::size_t ours = head != nullptr ? 1 : 0;
     if (expectedMerge_ != nullptr || parents.size() > ours)

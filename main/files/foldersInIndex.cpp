@@ -81,4 +81,9 @@ bool takeOutBelowFiles(git_index *index, const PathspecArray &pathspec)
     return !paths.empty();
 }
 
+bool hasFilesBelowFiles(git_index *index)
+{
+    return !findBelowFiles(index).empty();
+}
+
 } // namespace vclink::git

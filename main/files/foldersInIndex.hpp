@@ -16,4 +16,7 @@ class PathspecArray;
 /// @throws LibGit2Exception
 bool takeOutBelowFiles(git_index *index, const PathspecArray &pathspec);
 
+/// Whether there is anything below a file of the index.
+bool hasFilesBelowFiles(git_index *index);
+
 } // namespace vclink::git

@@ -102,22 +102,14 @@ bool isBefore(const timespec &left, const timespec &right)
     return std::tie(left.tv_sec, left.tv_nsec) < std::tie(right.tv_sec, right.tv_nsec);
 }
 
-void restoreDropped(git_repository *repository, git_index *index, git_index *before)
+void refuseUnreadableAmongDropped(git_repository *repository, git_index *index, git_index *before)
 {
     const std::string workdir = git_repository_workdir(repository);
     const std::size_t count = git_index_entrycount(before);
     for (std::size_t i = 0; i < count; ++i)
     {
         const git_index_entry *const entry = git_index_get_byindex(before, i);
-        if (isIndexed(index, entry->path))
-        {
-            continue;
-        }
-        if ((entry->flags_extended & GIT_INDEX_ENTRY_SKIP_WORKTREE) != 0)
-        {
-            check(git_index_add, index, entry);
-        }
-        else
+        if (!isIndexed(index, entry->path))
         {
             refuseUnreadable(workdir, entry->path);
         }
@@ -126,15 +118,18 @@ void restoreDropped(git_repository *repository, git_index *index, git_index *bef
 
 } // namespace
 
-void refreshIndex(git_repository *repository, git_index *index)
+void refreshIndex(git_repository *repository, git_index *index, const ChangedFiles &changed,
+                  HeldEntries &held)
 {
     const std::size_t countBefore = git_index_entrycount(index);
-    stageEmptiedFiles(repository, index);
+    stageEmptiedFiles(repository, index, changed.files());
+    held.holdLeftOut(index);
     check(git_index_update_all, index, nullptr, nullptr, nullptr);
+    held.giveBack(index);
     if (git_index_entrycount(index) < countBefore)
     {
         const OwnedHandle<git_index> before = openIndex(git_index_path(index));
-        restoreDropped(repository, index, before.get());
+        refuseUnreadableAmongDropped(repository, index, before.get());
     }
 }
 

@@ -6,9 +6,9 @@
 #include "error/errorUtil/gitString.hpp"
 #include "error/raise.hpp"
 #include "fl/filesystem/operations.hpp"
-#include "main/files/EmptiedFiles.hpp"
 #include "main/files/GitAdapter.hpp"
 #include "main/files/foldersInIndex.hpp"
+#include "main/files/prepareAddition.hpp"
 #include "util/lock/IndexLock.hpp"
 #include "util/path/PathspecArray.hpp"
 #include "util/repository/repository.hpp"
@@ -91,10 +91,11 @@ void GitAdapter::addToIndex(const std::vector<upath> &files)
     IndexLock lock(repository.get());
     const OwnedHandle<git_index> index = getRepositoryIndex(repository.get());
     const PathspecArray pathspec = makeFilePathspec(files, root_);
-    const EmptiedFiles emptied(repository.get(), index.get(), pathspec.array());
+    HeldEntries held;
+    prepareAddition(repository.get(), index.get(), pathspec.array(), held);
     check(git_index_add_all, index.get(), getArrayPointer(pathspec), GIT_INDEX_ADD_DEFAULT,
           acceptAllPaths, this);
-    emptied.giveBack(index.get());
+    held.giveBack(index.get());
     takeOutBelowFiles(index.get(), pathspec);
     writeIndex(index.get());
     lock.publish();

@@ -122,10 +122,14 @@ std::vector<Tolerance> tolerancesOfCommits(const std::string &operation, const s
         {"commitUnreadable", "git_index_find", 1, GIT_ENOTFOUND, missed("file")},
         {"commitUnreadable", "git_index_find", 2, GIT_ENOTFOUND, missed("other")},
         {"commitUnreadable", "git_index_find", any, GIT_ENOTFOUND, normal},
-        {"commit", "git_index_find", 1, GIT_ENOTFOUND, missed("file")},
-        {"commit", "git_index_find", 3, GIT_ENOTFOUND, missed("staged")},
-        {"commit", "git_index_find", 4, GIT_ENOTFOUND, missed("sub/inside")},
-        {"commit", "git_index_find", any, GIT_ENOTFOUND, normal},
+        // The refresh takes the files that can't be taken by their paths.
+        {"commit", "git_diff_index_to_workdir", any, any, normal},
+        {"merge", "git_diff_index_to_workdir", any, any, normal},
+        {"commit", "git_index_add_bypath", any, any, normal},
+        {"commit", "git_index_remove_bypath", any, any, normal},
+        // So does the addition.
+        {"markResolved", "git_diff_index_to_workdir", any, any, normal},
+        {"markResolved", "git_index_add_bypath", any, any, normal},
         // The text of the failure is the injected one then.
         {"commit", "git_error_set_str", any, any, failure(GIT_ERROR, GIT_ERROR_OS, injectedText)},
     };

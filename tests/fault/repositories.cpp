@@ -91,6 +91,7 @@ void makeSparse(GitRepository &repository)
     repository.git({"update-index", "--skip-worktree", "sub/inside"});
     repository.remove("sub");
     repository.remove("file");
+    repository.write("file/untracked", "x");
 }
 
 void makeEmptied(GitRepository &repository)

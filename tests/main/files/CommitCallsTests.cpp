@@ -1,8 +1,6 @@
 // SPDX-License-Identifier: MIT
-#include <algorithm>
 #include <cstddef>
 #include <cstdlib>
-#include <memory>
 #include <ostream>
 #include <string>
 #include <vector>
@@ -11,8 +9,7 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
-#include "CommitFixture.hpp"
-#include "support/libgit2/LibGit2Recorder.hpp"
+#include "CommitCallsFixture.hpp"
 
 namespace
 {
@@ -23,26 +20,8 @@ using testing::IsEmpty;
 using testing::Not;
 using namespace vclink::test;
 
-class CommitCalls : public CommitFixture
+class CommitCalls : public CommitCallsFixture
 {
-  protected:
-    CommitCalls()
-    {
-        adapter_ = makeAdapter(repository_.path());
-    }
-
-    void commitOnce()
-    {
-        adapter_->commit(upath(), u"message");
-    }
-    void startNoting()
-    {
-        calls_.reset();
-        calls_ = std::make_unique<LibGit2Recorder>();
-    }
-
-    std::unique_ptr<vclink::git::GitAdapter> adapter_;
-    std::unique_ptr<LibGit2Recorder> calls_;
 };
 
 TEST_F(CommitCalls, ComeInTheirOrderAndReleaseInReverse)
@@ -136,61 +115,6 @@ TEST_F(CommitCalls, GiveOneSignatureTwiceAndTheEncodingAlways)
         });
     commitOnce();
     EXPECT_EQ(count, 1);
-}
-
-TEST_F(CommitCalls, ReadTheIndexFileAgainOnlyWhenAnEntryIsGone)
-{
-    startNoting();
-    repository_.write("file", "changed\n");
-    repository_.write("new", "x");
-    commitOnce();
-    // Once for the lock.
-    EXPECT_THAT(calls_->steps(), Contains("git_index_open").Times(1));
-    startNoting();
-    repository_.remove("file");
-    commitOnce();
-    EXPECT_THAT(calls_->steps(), Contains("git_index_open").Times(2));
-    EXPECT_THAT(calls_->steps(), Not(Contains("git_index_add")));
-    EXPECT_THAT(calls_->openHandles(), IsEmpty());
-}
-
-TEST_F(CommitCalls, ReadTheIndexFileAgainBeforeTheyWriteIt)
-{
-    repository_.remove("file");
-    startNoting();
-    commitOnce();
-    auto steps = calls_->steps();
-    const auto lookUps = std::remove(steps.begin(), steps.end(), "git_index_find");
-    EXPECT_EQ(steps.end() - lookUps, 3) << "once for each entry that was there";
-    steps.erase(lookUps, steps.end());
-    ASSERT_GE(steps.size(), 15U);
-    EXPECT_THAT(std::vector<std::string>(steps.begin() + 10, steps.begin() + 15),
-                ElementsAre("git_repository_index", "git_index_update_all", "git_index_open",
-                            "git_index_free", "git_index_write"));
-}
-
-TEST_F(CommitCalls, PutBackOnlyWhatIsNotCheckedOutAndNotThere)
-{
-    repository_.write("there", "x");
-    repository_.commitAll("second");
-    repository_.git({"update-index", "--skip-worktree", "file", "sub/inside", "there"});
-    for (const auto *name : {"file", "sub/inside", "other"})
-        repository_.remove(name);
-    startNoting();
-    commitOnce();
-    EXPECT_THAT(calls_->steps(), Contains("git_index_add").Times(2));
-    EXPECT_THAT(namesIn(), ElementsAre("file", "sub/inside", "there"));
-}
-
-/// Three stages become one entry, and none is gone.
-TEST_F(CommitCalls, PutNothingBackWhenAConflictEnds)
-{
-    beginMerge({"file"});
-    startNoting();
-    commitOnce();
-    EXPECT_THAT(calls_->steps(), Contains("git_index_open").Times(2));
-    EXPECT_THAT(calls_->steps(), Not(Contains("git_index_add")));
-    EXPECT_THAT(namesIn(), ElementsAre("file", "other", "sub/inside"));
 }
 
 /// HEAD is unknown for some reason: libgit2 reports it when the commit is made.

@@ -16,6 +16,7 @@ namespace
 
 using shared_vclink::git::AlreadyAdded;
 using shared_vclink::git::NoFilesToRemove;
+using testing::Contains;
 using testing::ElementsAre;
 using testing::IsEmpty;
 using vclink::git::TagException;
@@ -87,6 +88,53 @@ TEST_F(StagingCalls, OfAnAdditionFollowThoseOfTheQuery)
 {
     add({"new"});
     EXPECT_EQ(calls_.steps(), ofTheQuery + ofTheAddition);
+    EXPECT_THAT(calls_.openHandles(), IsEmpty());
+}
+
+/// libgit2 compares the text of each changed file.
+TEST_F(StagingCalls, OfAnAdditionHoldWhatElseHasChanged)
+{
+    repository_.write("file", "changed and longer\n");
+    repository_.remove("other");
+    const auto expected = indexOf(repository_);
+    std::vector<unsigned> held;
+    calls_.on<git_index_add_all>(
+        [&held](git_index *index, const git_strarray *, unsigned, git_index_matched_path_cb, void *)
+        {
+            for (const auto *name : {"file", "other", "sub/inside"})
+                held.push_back(git_index_get_bypath(index, name, 0)->flags & GIT_INDEX_ENTRY_VALID);
+        });
+    add({"new"});
+    const Names prepare{"git_pathspec_new", "git_index_caps", "git_pathspec_matches_path",
+                        "git_pathspec_matches_path", "git_pathspec_free"};
+    const Names addition{"git_index_add_all", "git_index_write"};
+    EXPECT_EQ(calls_.steps(), ofTheQuery + ofTheLock + Names{"git_repository_index"} + prepare +
+                                  addition + ofTheEnd);
+    EXPECT_THAT(calls_.openHandles(), IsEmpty());
+    EXPECT_THAT(held, ElementsAre(GIT_INDEX_ENTRY_VALID, GIT_INDEX_ENTRY_VALID, 0U));
+    auto after = indexOf(repository_);
+    EXPECT_EQ(after.erase("new"), 1U);
+    EXPECT_EQ(after, expected);
+}
+
+TEST_F(StagingCalls, OfAModifiedFileMarkedAsResolvedStageItByItsPath)
+{
+    repository_.write("file", "changed and longer\n");
+    repository_.write("other", "changed, too\n");
+    const auto expected = stateAfterGit({{"add", "file"}}).index;
+    for (const auto *failing : {"git_index_add_bypath", "git_diff_index_to_workdir"})
+    {
+        calls_.fail({{failing, -42}});
+        markResolved("file");
+        EXPECT_THAT(calls_.steps(), Contains("git_index_read"));
+        EXPECT_EQ(indexOf(repository_), expected) << failing;
+        repository_.git({"restore", "--staged", "file"});
+    }
+    calls_.fail({});
+    calls_.clear();
+    markResolved("file");
+    EXPECT_THAT(calls_.steps(), Contains("git_index_add_bypath").Times(1));
+    EXPECT_EQ(indexOf(repository_), expected);
     EXPECT_THAT(calls_.openHandles(), IsEmpty());
 }
 

@@ -1,0 +1,203 @@
+// SPDX-License-Identifier: MIT
+#include "main/files/ChangedFiles.hpp"
+
+#include <algorithm>
+#include <array>
+#include <cerrno>
+#include <cstddef>
+#include <cstdint>
+#include <iterator>
+#include <optional>
+#include <string_view>
+#include <utility>
+
+#include <git2/index.h>
+#include <git2/repository.h>
+#include <strings.h>
+#include <sys/stat.h>
+
+namespace vclink::git
+{
+namespace
+{
+
+constexpr std::array<unsigned char, sizeof(git_oid::id)> emptyBlob{
+    0xe6, 0x9d, 0xe2, 0x9b, 0xb2, 0xd1, 0xd6, 0x43, 0x4b, 0x8b,
+    0x29, 0xae, 0x77, 0x5a, 0xd8, 0xc2, 0xe4, 0x8c, 0x53, 0x91};
+
+/// The mode that Git has for what is there. GIT_FILEMODE_UNREADABLE if it is not a file or link.
+std::uint32_t modeOf(const struct stat &status)
+{
+    if (S_ISLNK(status.st_mode))
+    {
+        return GIT_FILEMODE_LINK;
+    }
+    if (!S_ISREG(status.st_mode))
+    {
+        return GIT_FILEMODE_UNREADABLE;
+    }
+    return (status.st_mode & S_IXUSR) != 0 ? GIT_FILEMODE_BLOB_EXECUTABLE : GIT_FILEMODE_BLOB;
+}
+
+bool isFile(std::uint32_t mode)
+{
+    return mode == GIT_FILEMODE_BLOB || mode == GIT_FILEMODE_BLOB_EXECUTABLE;
+}
+
+/// Some programs write an index without fractions of seconds.
+bool isSameTime(const git_index_time &noted, const timespec &time)
+{
+    return noted.seconds == static_cast<std::int32_t>(time.tv_sec) &&
+           (noted.nanoseconds == 0 ||
+            noted.nanoseconds == static_cast<std::uint32_t>(time.tv_nsec));
+}
+
+bool isEmptyFile(const struct stat &status)
+{
+    return S_ISREG(status.st_mode) && status.st_size == 0;
+}
+
+/// An entry that is to be compared by its content has the size of an empty file.
+bool isEmptyButNotNoted(const git_index_entry &entry, const struct stat &status)
+{
+    return isEmptyFile(status) && !isEmptyBlob(entry.id);
+}
+
+bool isAsNoted(const git_index_entry &entry, const struct stat &status)
+{
+    return entry.mode == modeOf(status) &&
+           entry.file_size == static_cast<std::uint32_t>(status.st_size) &&
+           isSameTime(entry.mtime, status.st_mtim) && isSameTime(entry.ctime, status.st_ctim) &&
+           entry.ino == static_cast<std::uint32_t>(status.st_ino) &&
+           entry.uid == static_cast<std::uint32_t>(status.st_uid) &&
+           entry.gid == static_cast<std::uint32_t>(status.st_gid) &&
+           !isEmptyButNotNoted(entry, status);
+}
+
+bool isCompared(const git_index_entry &entry)
+{
+    return (entry.flags & GIT_INDEX_ENTRY_VALID) == 0 &&
+           (entry.flags_extended & GIT_INDEX_ENTRY_SKIP_WORKTREE) == 0;
+}
+
+/// The second in which the index file was written, or 0, before all entries.
+std::int32_t timeOf(git_index *index)
+{
+    struct stat status = {};
+    const char *const path = git_index_path(index);
+    return path != nullptr && ::stat(path, &status) == 0
+               ? static_cast<std::int32_t>(status.st_mtim.tv_sec)
+               : 0;
+}
+
+/// Returns 0 or the error. An error is tried again once, so that a passing one does not hide a
+/// file.
+int readStatus(const std::string &path, struct stat &status)
+{
+    if (::lstat(path.c_str(), &status) == 0)
+    {
+        return 0;
+    }
+    if (errno != ENOENT && errno != ENOTDIR && ::lstat(path.c_str(), &status) == 0)
+    {
+        return 0;
+    }
+    return errno;
+}
+
+/// Looks at the entries of one index, in their order.
+class Look
+{
+  public:
+    Look(std::string workdir, git_index *index)
+        : path_(std::move(workdir)), rootSize_(path_.size()), indexTime_(timeOf(index))
+    {
+    }
+
+    std::optional<ChangedFile> at(const git_index_entry &entry)
+    {
+        const bool isSamePath = last_ == entry.path;
+        dependOnOrder_ = dependOnOrder_ || (isSamePath && isLastNormal_);
+        last_ = entry.path;
+        isLastNormal_ = GIT_INDEX_ENTRY_STAGE(&entry) == GIT_INDEX_STAGE_NORMAL;
+        if (!isLastNormal_)
+        {
+            dependOnOrder_ = dependOnOrder_ || isForAttributes(entry.path);
+            return std::nullopt;
+        }
+        return isCompared(entry) && entry.mode != GIT_FILEMODE_COMMIT ? compare(entry)
+                                                                      : std::nullopt;
+    }
+
+    bool dependOnOrder() const noexcept
+    {
+        return dependOnOrder_;
+    }
+
+  private:
+    std::optional<ChangedFile> compare(const git_index_entry &entry)
+    {
+        struct stat status = {};
+        path_.replace(rootSize_, std::string::npos, entry.path);
+        const int error = readStatus(path_, status);
+        if (error == ENOENT || error == ENOTDIR)
+        {
+            return ChangedFile{entry.path, GIT_FILEMODE_UNREADABLE, isFile(entry.mode), false};
+        }
+        const std::uint32_t mode = modeOf(status);
+        if (error != 0 || mode == GIT_FILEMODE_UNREADABLE)
+        {
+            dependOnOrder_ = dependOnOrder_ || isForAttributes(entry.path);
+            return std::nullopt;
+        }
+        // What is in a file with attributes decides about other files too.
+        const bool isDoubtful = entry.mtime.seconds >= indexTime_ && isForAttributes(entry.path);
+        if (isAsNoted(entry, status) && !isDoubtful)
+        {
+            return std::nullopt;
+        }
+        return ChangedFile{entry.path, mode, isFile(mode) && isFile(entry.mode),
+                           isEmptyFile(status)};
+    }
+
+    std::string path_;
+    std::size_t rootSize_;
+    std::int32_t indexTime_;
+    std::string_view last_;
+    bool isLastNormal_ = false;
+    bool dependOnOrder_ = false;
+};
+
+} // namespace
+
+ChangedFiles::ChangedFiles(git_repository *repository, git_index *index)
+{
+    const char *const workdir = git_repository_workdir(repository);
+    if (workdir == nullptr)
+    {
+        return;
+    }
+    Look look(workdir, index);
+    const std::size_t count = git_index_entrycount(index);
+    for (std::size_t i = 0; i < count; ++i)
+    {
+        if (auto changed = look.at(*git_index_get_byindex(index, i)))
+        {
+            files_.push_back(*std::move(changed));
+        }
+    }
+    dependOnOrder_ = look.dependOnOrder();
+}
+
+bool isEmptyBlob(const git_oid &id) noexcept
+{
+    return std::equal(emptyBlob.begin(), emptyBlob.end(), std::begin(id.id));
+}
+
+bool isForAttributes(const std::string &path) noexcept
+{
+    // A file system may ignore case.
+    return ::strcasecmp(path.c_str() + path.rfind('/') + 1, ".gitattributes") == 0;
+}
+
+} // namespace vclink::git
