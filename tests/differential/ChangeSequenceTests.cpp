@@ -10,6 +10,7 @@
 #include <gtest/gtest.h>
 
 #include "ChangeSequence.hpp"
+#include "numberFrom.hpp"
 #include "support/GitFixture.hpp"
 #include "support/LibGit2Session.hpp"
 
@@ -18,16 +19,11 @@ namespace
 
 namespace fs = std::filesystem;
 using vclink::test::ChangeSequence;
+using vclink::test::numberFrom;
 
 constexpr std::uint64_t sequenceBlocks = 4;
 constexpr std::uint64_t sequencesInBlock = 13;
 constexpr std::uint64_t variedSequences = 25;
-
-std::uint64_t numberFrom(const char *variable, std::uint64_t otherwise)
-{
-    const char *const text = std::getenv(variable);
-    return text == nullptr ? otherwise : std::stoull(text);
-}
 
 /// 13 sequences a block, or as many as VCLINK_SEQUENCES says; a block ends with the first that
 /// fails, and prints its seed and what was done. VCLINK_FIRST is the first seed of all; the preset
