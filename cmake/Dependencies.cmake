@@ -1,7 +1,7 @@
 # SPDX-License-Identifier: MIT
-# The libraries that the library and its programs are built on. Reasons: docs/linking.md.
+# Finds the libraries that the library and its programs need. docs/linking.md has the reasons.
 find_package(PkgConfig REQUIRED)
-# libgit2 comes with a CMake package only from 1.9 on.
+# libgit2 has a CMake package only since 1.9.
 pkg_check_modules(libgit2 REQUIRED IMPORTED_TARGET libgit2>=1.0)
 
 set(Boost_USE_STATIC_LIBS OFF)

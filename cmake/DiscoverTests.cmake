@@ -1,6 +1,6 @@
 # SPDX-License-Identifier: MIT
-# Asks a test program for its GoogleTest cases, after it is linked, and writes them down as tests of
-# ctest: one for each suite, or with EACH_CASE one for each case. See cmake/Tests.cmake.
+# Runs after a test program is linked: lists its GoogleTest cases and writes tests for ctest, one for each suite, or
+# with EACH_CASE one for each case. See cmake/Tests.cmake.
 cmake_minimum_required(VERSION 3.25)
 
 # vclink_write_test(SUBJECT FILTER CASES): appends to `script`.
@@ -25,8 +25,8 @@ execute_process(
 if(NOT result EQUAL 0)
     message(FATAL_ERROR "${PROGRAM} does not list its tests: ${result}\n${output}")
 endif()
-# Suites begin at the start of a line and end with a dot; cases are indented. The parameters' values
-# follow a '#', and may hold anything.
+# A line that is not indented and ends with a dot is a suite; an indented line is a case. Values of parameters
+# follow a '#', and can contain anything.
 string(REGEX REPLACE "#[^\n]*" "" output "${output}")
 string(REGEX REPLACE " *\n" ";" lines "${output}")
 

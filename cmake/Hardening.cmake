@@ -1,6 +1,6 @@
 # SPDX-License-Identifier: MIT
-# vclink_hardening: what the shared libraries and the programs that ship are compiled and linked
-# with, so that a fault in them is harder to turn into more. Never exported.
+# vclink_hardening: options for the shared libraries and programs that ship, so that a fault in them is harder to
+# exploit. Never exported.
 add_library(vclink_hardening INTERFACE)
 target_compile_options(vclink_hardening INTERFACE -fstack-protector-strong)
 if(CMAKE_SYSTEM_PROCESSOR STREQUAL "x86_64")
@@ -12,6 +12,6 @@ target_link_options(vclink_hardening INTERFACE
 if(NOT VCLINK_SANITIZE)
     target_compile_options(vclink_hardening INTERFACE
         $<$<CONFIG:Release,RelWithDebInfo,MinSizeRel>:-U_FORTIFY_SOURCE -D_FORTIFY_SOURCE=2>)
-    # clang's sanitizers leave their names to be found in the program.
+    # clang's sanitizers need undefined names, which the program defines.
     target_link_options(vclink_hardening INTERFACE -Wl,--no-undefined)
 endif()

@@ -1,6 +1,6 @@
 # SPDX-License-Identifier: MIT
-# What is installed, in components that are a package each: runtime and development here, shell when
-# it is built, host-runtime and host-development of the stand-in.
+# Install rules. Each component is a package: runtime and development here, shell if it is built; the stand-in has
+# host-runtime and host-development.
 install(TARGETS vclink_git EXPORT vclink_git
     LIBRARY DESTINATION "${CMAKE_INSTALL_LIBDIR}"
         COMPONENT runtime NAMELINK_COMPONENT development)
@@ -11,7 +11,7 @@ install(DIRECTORY include/
 vclink_install_package_files(vclink_git "${PROJECT_SOURCE_DIR}/cmake/package"
     COMPONENT development)
 
-# In the same layout as here, so that their links lead to each other and to the examples.
+# The same layout as in the repository, so that links between documents and examples work.
 install(FILES README.md CHANGELOG.md SECURITY.md
     DESTINATION share/doc/libvclink-git-dev
     COMPONENT development)

@@ -1,15 +1,14 @@
 # SPDX-License-Identifier: MIT
-# The layers' sources are compiled once, as objects: the shared library shows of them what the host
-# sees, and the tests link the objects themselves and so reach what is hidden.
+# The layers' sources are compiled once, as objects. The shared library exports only what a host needs; tests link
+# the objects themselves, and so reach what is hidden.
 #
-# vclink_add_layer_objects(TARGET): objects that are compiled as the layers' are.
+# vclink_add_layer_objects(TARGET): adds objects that are compiled like those of the layers.
 option(VCLINK_UNITY_LAYERS "Let CMAKE_UNITY_BUILD join the layers' sources too" OFF)
 function(vclink_add_layer_objects target)
     add_library(${target} OBJECT)
     vclink_configure_target(${target})
     target_link_libraries(${target} PRIVATE vclink_hardening)
-    # Whole debug information, whatever the preset says: the packages for debuggers and the report on
-    # the binary interface are made from it.
+    # Complete debug information in each preset: the debug-symbol packages and scripts/abi need it.
     target_compile_options(${target} PRIVATE $<$<CONFIG:RelWithDebInfo>:-g2>)
     if(NOT VCLINK_UNITY_LAYERS)
         set_target_properties(${target} PROPERTIES UNITY_BUILD OFF)

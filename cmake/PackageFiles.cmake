@@ -1,7 +1,7 @@
 # SPDX-License-Identifier: MIT
-# vclink_install_package_files(PACKAGE FOLDER COMPONENT component): what finds an installed library
-# from CMake and from pkg-config, made of the templates in FOLDER. Everything in it is told relative
-# to the file itself, so that an installation may be moved as a whole.
+# vclink_install_package_files(PACKAGE FOLDER COMPONENT component): installs the files with which CMake and
+# pkg-config find the library, from the templates in FOLDER. Their paths are relative to the files themselves, so
+# that an installation can be moved as a whole.
 include(CMakePackageConfigHelpers)
 
 if(VCLINK_INSTALL)

@@ -1,5 +1,5 @@
 # SPDX-License-Identifier: MIT
-# Debian packages, one a component: `cpack -G DEB` in a build folder.
+# Debian packages, one for each component: `cpack -G DEB` in a build folder.
 set(CPACK_GENERATOR DEB)
 set(CPACK_PACKAGE_NAME vclink-git)
 set(CPACK_PACKAGE_VENDOR "vclink")
@@ -14,16 +14,16 @@ set(CPACK_COMPONENTS_ALL runtime development)
 set(CPACK_DEB_COMPONENT_INSTALL ON)
 set(CPACK_DEBIAN_FILE_NAME DEB-DEFAULT)
 set(CPACK_DEBIAN_PACKAGE_CONTROL_STRICT_PERMISSION ON)
-# What debuggers read is in packages of its own, of the extension ddeb.
+# Debug symbols are in packages of their own, with the extension ddeb.
 set(CPACK_DEBIAN_DEBUGINFO_PACKAGE ON)
 
-# Dependencies on others' libraries are read from the files, those between the packages are given.
+# dpkg-shlibdeps finds the dependencies on other libraries; those between our packages are listed below.
 set(CPACK_DEBIAN_PACKAGE_SHLIBDEPS ON)
 set(CPACK_DEBIAN_PACKAGE_SHLIBDEPS_PRIVATE_DIRS "${VCLINK_STAGE_DIR}/${CMAKE_INSTALL_LIBDIR}")
 set(CPACK_DEBIAN_PACKAGE_GENERATE_SHLIBS ON)
 set(CPACK_DEBIAN_PACKAGE_GENERATE_SHLIBS_POLICY ">=")
 
-# The licence as Debian's tools read it: indented, a full stop where a line is empty.
+# The licence in the form that Debian's tools read: indented, with a full stop in empty lines.
 file(READ "${PROJECT_SOURCE_DIR}/LICENSE" licence)
 string(REGEX REPLACE ".*\nCopyright \\(c\\) ([^\n]+)\n+(.*)" "\\1" holder "${licence}")
 string(REGEX REPLACE ".*\nCopyright \\(c\\) ([^\n]+)\n+(.*[^\n])\n*" "\n\\2" terms "${licence}")
@@ -39,7 +39,7 @@ Copyright: @holder@
 License: Expat@terms@
 " @ONLY)
 
-# vclink_compress(FILE RESULT): as Debian has documents, without a name or a time inside.
+# vclink_compress(FILE RESULT): compresses a document as Debian requires, without a name or a time inside.
 find_program(VCLINK_GZIP gzip REQUIRED)
 mark_as_advanced(VCLINK_GZIP)
 function(vclink_compress file result)
@@ -52,24 +52,24 @@ set(changelog "${PROJECT_BINARY_DIR}/package/changelog")
 file(CONFIGURE OUTPUT "${changelog}" CONTENT
 "vclink-git (@PROJECT_VERSION@) unstable; urgency=medium
 
-  * What has changed is told in CHANGELOG.md, in libvclink-git-dev.
+  * CHANGELOG.md in libvclink-git-dev lists the changes.
 
  -- @CPACK_PACKAGE_CONTACT@  Sun, 01 Nov 2026 12:00:00 +0000
 " @ONLY)
 vclink_compress("${changelog}" "${changelog}.gz")
 
-# What a package with a shared library has the system do.
+# Makes dpkg update the cache of shared libraries.
 set(triggers "${PROJECT_BINARY_DIR}/package/triggers")
 file(WRITE "${triggers}" "activate-noawait ldconfig\n")
 
-# Remarks of lintian that are meant, with the reason.
+# Remarks of lintian that do not apply, with the reason.
 set(reason_bogus-mail-host "The packages are made where they are used, and have no maintainer.")
 set(reason_bogus-mail-host-in-debian-changelog "${reason_bogus-mail-host}")
 set(reason_maintscript-calls-ldconfig "CPack's own scripts, beside the trigger.")
 set(reason_subdir-in-usr-bin "The application looks for its launchers there.")
 
-# vclink_package(COMPONENT NAME SECTION SUMMARY [DEPENDS text] [LINTIAN tag...] [TRIGGERS]): a component
-# as a package; TRIGGERS for one with a shared library.
+# vclink_package(COMPONENT NAME SECTION SUMMARY [DEPENDS text] [LINTIAN tag...] [TRIGGERS]): makes a component a
+# package; TRIGGERS is for packages with a shared library.
 macro(vclink_package component name section summary)
     cmake_parse_arguments(package "TRIGGERS" "DEPENDS" "LINTIAN" ${ARGN})
     string(TOUPPER "${component}" upper)
@@ -94,8 +94,8 @@ macro(vclink_package component name section summary)
         COMPONENT ${component})
 endmacro()
 
-# The first packages of libgit2 with the fixes that docs/linking.md lists. What is read from the files
-# would also be satisfied by older ones.
+# The first packages of libgit2 with the fixes that docs/linking.md lists. The dependency that dpkg-shlibdeps finds
+# allows older ones.
 set(safe_libgit2_1.5 "1.5.1+ds-1+deb12u2")
 set(safe_libgit2_1.8 "1.8.7")
 set(safe_libgit2_1.9 "1.9.7")

@@ -1,6 +1,6 @@
 # SPDX-License-Identifier: MIT
-# vclink_instrumentation: sanitizers, and what measures, as the presets choose them. Never exported.
-# vclink_linked_instrumentation: for what only links with them.
+# vclink_instrumentation: sanitizers, coverage and recording of reached places, as the preset chooses. Never
+# exported. vclink_linked_instrumentation: for targets that only link with them.
 add_library(vclink_linked_instrumentation INTERFACE)
 add_library(vclink_instrumentation INTERFACE)
 target_link_libraries(vclink_instrumentation INTERFACE vclink_linked_instrumentation)
@@ -11,7 +11,7 @@ if(VCLINK_SANITIZE)
     target_link_options(vclink_linked_instrumentation INTERFACE -fsanitize=${sanitizers})
 endif()
 
-# What measures the tests instruments the library's objects, and nothing else.
+# Coverage and recording instrument only the library's objects.
 if(VCLINK_COVERAGE)
     target_link_options(vclink_linked_instrumentation INTERFACE --coverage)
 endif()
@@ -21,7 +21,7 @@ function(vclink_measure target)
         target_compile_options(${target} PRIVATE --coverage -fprofile-abs-path)
     endif()
     if(VCLINK_RECORD_REACH)
-        # Without warnings: they are errors here, and a mutant is often worth one.
+        # Without warnings: they are errors here, and many mutants cause one.
         target_compile_options(${target} PRIVATE
             -fsanitize-coverage=inline-8bit-counters,pc-table -gline-tables-only -w)
     endif()

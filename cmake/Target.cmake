@@ -1,5 +1,5 @@
 # SPDX-License-Identifier: MIT
-# What every compiled target of this repository has in common.
+# Settings of every compiled target of this repository.
 function(vclink_configure_language target)
     target_compile_features(${target} PUBLIC cxx_std_17)
     set_target_properties(${target} PROPERTIES
@@ -16,9 +16,9 @@ function(vclink_configure_target target)
     target_link_libraries(${target} PRIVATE $<BUILD_INTERFACE:vclink_instrumentation>)
 endfunction()
 
-# Tests, and what helps them, compile with these flags in place of the configuration's and of the
-# sanitizers'. With the same flags in two presets the compiler cache serves both. The layers, the
-# stand-in and the programs keep what the preset gives them.
+# Tests and their helpers compile with these flags instead of those of the configuration and the sanitizers. If two
+# presets have the same flags, the compiler cache serves both. The layers, the stand-in and the programs keep the
+# flags of the preset.
 set(VCLINK_TEST_FLAGS "" CACHE STRING "Compiler flags of tests; empty: those of everything else")
 set(VCLINK_TEST_LINK_OPTIONS "" CACHE STRING "Linker options of tests, besides those of everything")
 
@@ -40,6 +40,6 @@ macro(vclink_use_test_flags)
     endif()
 endmacro()
 
-# Shared libraries and programs lie in the build tree as they do when installed, so that what is
-# found relative to them is found in both.
+# Shared libraries and programs have the same layout in the build tree as when they are installed, so that both find
+# files relative to themselves.
 set(VCLINK_STAGE_DIR "${PROJECT_BINARY_DIR}/stage")

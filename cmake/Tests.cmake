@@ -3,12 +3,12 @@
 
 # vclink_discover_tests(TARGET LABEL label [EACH_CASE] [COST cost] [TIMEOUT seconds]
 #     [PROPERTIES name value...]): makes each suite of the program a test of ctest, called
-# PROGRAM.SUITE. The cases of a suite run one after the other in one process: to start a program
-# under the sanitizers takes longer than most cases do. With EACH_CASE each case is a test, called
-# PROGRAM.SUITE.CASE, with a process of its own: for long cases, so that no processor idles at the
-# end, and for threads, which may race only where something is used for the first time. COST is the
-# time of a case in tenths of a second, 1 by default: ctest starts the longest tests first. TIMEOUT
-# is that of a test, 600 by default.
+# PROGRAM.SUITE. The cases of a suite run one after the other in one process, because the start of a
+# program under the sanitizers takes longer than most cases. With EACH_CASE each case is a test,
+# called PROGRAM.SUITE.CASE, with a process of its own: for long cases, so that no processor is idle
+# at the end, and for threads, because some races occur only when something is used for the first
+# time. COST is the time of a case in tenths of a second, 1 by default: ctest starts the longest
+# tests first. TIMEOUT is the limit of a test in seconds, 600 by default.
 #
 # The target vclink_tests_labelled_LABEL builds the programs with this label.
 #
@@ -63,16 +63,16 @@ endif()
 endfunction()
 
 # vclink_add_tests(TARGET LABEL label SOURCES file... [LIBRARIES library...] [EACH_CASE]
-#     [COST cost]): such a program. It links the layers' objects, so that what the library hides
-# can be tested too.
+#     [COST cost]): adds such a program. It links the layers' objects, so that tests reach what the
+# library hides.
 #
-# The objects come first on the link line: of an inline function that both have compiled, the linker
-# keeps the layers' one, with the layers' instrumentation and optimisation. Tests themselves may
-# have less of both (VCLINK_TEST_FLAGS). tests/instrumentation holds this.
+# The objects come first on the link line. If the test has compiled the same inline function, the
+# linker keeps the layers' copy, with their instrumentation and optimisation; tests can have less of
+# both (VCLINK_TEST_FLAGS). tests/instrumentation checks this.
 set(VCLINK_RUN_LABELS "" CACHE STRING
-    "Labels of the tests that can be run, all if empty; other tests only have to compile")
+    "Labels of the tests that this build runs, all if empty; other tests only have to compile")
 
-# vclink_is_run(RESULT LABEL...): whether tests with one of the labels can be run in this build.
+# vclink_is_run(RESULT LABEL...): sets RESULT to true if this build runs tests with one of the labels.
 function(vclink_is_run result)
     set(${result} FALSE PARENT_SCOPE)
     foreach(label IN LISTS ARGN)
@@ -82,8 +82,8 @@ function(vclink_is_run result)
     endforeach()
 endfunction()
 
-# vclink_configure_tests(TARGET LABEL...): a program, or a library of programs, whose tests have these
-# labels. If none of them can be run, the compiler reports errors and warnings, and makes no code.
+# vclink_configure_tests(TARGET LABEL...): configures a program or library whose tests have these labels. If this
+# build runs none of them, the compiler only reports errors and warnings, and makes no code.
 function(vclink_configure_tests target)
     vclink_configure_test_target(${target})
     vclink_is_run(run ${ARGN})

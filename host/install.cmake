@@ -1,6 +1,5 @@
 # SPDX-License-Identifier: MIT
-# The stand-in as a package of its own, apart from the library's: where the host's real SDK is
-# installed, it stays away.
+# The stand-in has packages of its own, which are not installed beside the host's real SDK.
 install(TARGETS vclink_host EXPORT vclink_host
     LIBRARY DESTINATION "${CMAKE_INSTALL_LIBDIR}"
         COMPONENT host-runtime NAMELINK_COMPONENT host-development)
@@ -11,7 +10,7 @@ install(DIRECTORY include/
 vclink_install_package_files(vclink_host "${CMAKE_CURRENT_SOURCE_DIR}/package"
     COMPONENT host-development)
 
-# Found below the place of installation under these names, whatever the folders of others are.
+# Both are found under these names below the installation folder, whatever GNUInstallDirs says.
 install(DIRECTORY "${VCLINK_STAGE_DIR}/share/locale"
     DESTINATION share
     COMPONENT host-runtime)

@@ -1,7 +1,7 @@
 #!/bin/sh
 # SPDX-License-Identifier: MIT
-# Merges THEIRS into OURS without asking anybody, and writes the result to MERGED. The status is 0
-# when there are no conflicts; otherwise MERGED is left as it is.
+# Merges THEIRS into OURS without a prompt, and writes the result to MERGED. If there are conflicts, the
+# status is not 0 and MERGED is unchanged.
 set -eu
 
 if [ $# -ne 4 ]; then
