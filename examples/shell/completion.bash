@@ -3,7 +3,7 @@
 # Completion of vclink-shell for bash. Commands and options come from its --help, branches and files
 # from the program, remotes from git.
 
-# The first words of the entries of a section in the help: all that stand before the blanks.
+# Prints the names in a section of the help.
 _vclink_shell_entries()
 {
     local program=$1 section=$2
@@ -16,7 +16,7 @@ _vclink_shell_entries()
         }'
 }
 
-# Names of files in these states, e.g. "modified|missing".
+# Prints the names of files in these states, e.g. "modified|missing".
 _vclink_shell_files()
 {
     local states=$1 record
@@ -26,7 +26,7 @@ _vclink_shell_files()
     done < <("$@" status -z 2>/dev/null)
 }
 
-# What can follow a command. COUNT is the number of its arguments so far.
+# _vclink_shell_arguments COMMAND COUNT PROGRAM...: prints what can follow a command after COUNT arguments.
 _vclink_shell_arguments()
 {
     local command=$1 count=$2
@@ -96,11 +96,11 @@ _vclink_shell()
     esac
     for word in "${words[@]}"; do
         if [[ $word != "$current"* ]]; then continue; fi
-        # Names may hold what the shell would expand.
+        # The shell would expand some characters in names.
         printf -v word '%q' "$word"
         COMPREPLY+=("$word")
     done
 }
 
-# If nothing is offered, the names of files are.
+# If there are no offers, bash offers names of files.
 complete -o bashdefault -o default -F _vclink_shell vclink-shell
