@@ -16,7 +16,7 @@ commit_of()
 }
 
 # ctest_result LOG CASES: what ctest has printed, and how many cases the programs have counted in a
-# file, which need not be there. Fails if the log tells no result.
+# file, which may be missing. Fails if the log has no result.
 ctest_result()
 {
     local cases=0
