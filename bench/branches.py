@@ -10,7 +10,7 @@ from programs import Ratios
 from report import Table
 
 ROUNDS = 7
-DRIVER_ROUNDS = 21  # a verdict depends on them
+DRIVER_ROUNDS = 21  # many, because a verdict depends on the times
 FILES = 4_000
 CHANGED = 1_000
 IN_COMMON = 100
@@ -21,13 +21,13 @@ FEW = 50
 
 
 def text(number, first="first", last="last"):
-    """A file of twenty lines, of which two sides may each change one end."""
+    """Returns a file of twenty lines, of which each side of a merge can change one end."""
     middle = "".join(f"int value{number}_{line}();\n" for line in range(18))
     return f"// {first}\n{middle}// {last}\n"
 
 
 def export_stream(base, ours, theirs, attributes):
-    """What git fast-import takes: a base and two branches on it, each a {number: text}."""
+    """Returns the input of git fast-import for a base and two branches on it, each a {number: text}."""
     yield b"blob\nmark :1\ndata 0\n\n"
     commits = (("main", base, None, ":2"), ("theirs", theirs, ":2", ":3"),
                ("main", ours, ":2", ":4"))
@@ -45,7 +45,7 @@ def export_stream(base, ours, theirs, attributes):
 
 
 class Operation:
-    """One operation in a working copy of its own, which is put back before each run."""
+    """One operation in a working copy of its own, which is restored before each run."""
 
     def __init__(self, name, title, limit, driver=None):
         self.name = name
@@ -53,7 +53,7 @@ class Operation:
         self.limit = limit
         self.driver = driver
         self._branch = "theirs"
-        # How many branches are made and packed, and how many of them the programs go through.
+        # The number of branches that are made and packed, and how many of them the programs visit.
         self._packed = {"branches": BRANCHES, "delete": PACKED, "revisions": PACKED}.get(name)
         if name in ("delete", "revisions"):
             self._branch = str(FEW)
@@ -97,7 +97,7 @@ class Operation:
         return base, {} if self.name == "switch" else ours, theirs
 
     def _write(self, files):
-        """Older than any index, so that no file's content is looked at for its youth."""
+        """Makes files older than the index, so that libgit2 need not read them to see if they changed."""
         past = time.time() - 1800
         for number, content in files.items():
             path = os.path.join(self._root, working_copies.name_of(number))
@@ -136,7 +136,7 @@ class BranchBench:
             operation.make(folder, env)
 
     def tasks(self):
-        """One task an operation, since its runs take turns in one working copy."""
+        """Returns one task for each operation, because its runs take turns in one working copy."""
         return {("branch", operation.name): lambda o=operation: self._count(o)
                 for operation in self._operations if not operation.driver}
 
@@ -148,7 +148,7 @@ class BranchBench:
     def clock(self):
         self._rounds = {}
         for operation in self._operations:
-            # The floor's process has mapped what the library's has, since that is what a fork costs.
+            # The floor maps the same memory as the library, because the cost of a fork depends on it.
             added = {"BENCH_LOAD": self._programs.library}
             if operation.driver and self._programs.tool in operation.driver:
                 added["BENCH_TOOL"] = self._programs.tool

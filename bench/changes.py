@@ -15,7 +15,7 @@ ROUNDS = 7
 
 
 class Change:
-    """One operation on a working copy of its own, which is put back before each run."""
+    """One operation in a working copy of its own, which is restored before each run."""
 
     def __init__(self, operation, title, tracked, listed):
         self.operation = operation
@@ -32,14 +32,14 @@ class Change:
             file.writelines(f"{name}\n" for name in self._names())
         self._edit()
         if self.operation == "revert":
-            # Half of what is reverted is staged.
+            # Half of the reverted changes are staged.
             staged = "".join(f"{name}\n" for name in self._names()[::2])
             working_copies.git(self._root, env, "add", "--pathspec-from-file=-",
                                input=staged.encode())
         shutil.copytree(os.path.join(self._root, ".git"), self._saved)
 
     def put_back(self):
-        """The repository as it was made, and the files that a revert touches."""
+        """Restores the repository as it was made, and the files that a revert touches."""
         shutil.rmtree(os.path.join(self._root, ".git"))
         shutil.copytree(self._saved, os.path.join(self._root, ".git"))
         if self.operation == "revert":
@@ -52,8 +52,8 @@ class Change:
                 for n in range(self._listed)]
 
     def _edit(self):
-        """Gives the listed files a content that is not tracked, and a time that is older than any
-        index's, so that no file's content is looked at for its youth."""
+        """Changes the listed files, and makes them older than the index, so that libgit2 need not read
+        other files to see if they changed."""
         past = time.time() - 1800
         for name in self._names():
             path = os.path.join(self._root, name)
@@ -79,7 +79,7 @@ class ChangeBench:
             change.make(folder, env)
 
     def tasks(self):
-        """One task an operation, since its runs take turns in one working copy."""
+        """Returns one task for each operation, because its runs take turns in one working copy."""
         return {("change", change.operation): lambda c=change: self._count(c)
                 for change in self._changes}
 

@@ -1,5 +1,5 @@
 # SPDX-License-Identifier: MIT
-"""git's own server, for the operations that are measured over git://."""
+"""git's own server, for measurements over git://."""
 
 import os
 import socket
@@ -24,7 +24,7 @@ class Daemon:
         self._env = env
 
     def __enter__(self):
-        # git itself would only be the parent of the program that serves.
+        # Starts the server itself: "git daemon" would only be its parent.
         program = os.path.join(subprocess.check_output(["git", "--exec-path"], text=True).strip(),
                                "git-daemon")
         for _ in range(ATTEMPTS):
@@ -40,7 +40,7 @@ class Daemon:
         raise SystemExit("bench: git daemon does not start")
 
     def _answers(self, port):
-        """Another program may have taken the port in between: ours has ended then."""
+        """Returns false if the server has ended, because another program has taken the port."""
         end = time.monotonic() + PATIENCE
         while time.monotonic() < end and self._process.poll() is None:
             try:

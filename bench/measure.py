@@ -19,8 +19,8 @@ from report import Table, write_into
 SIZES = {1_000: 31, 10_000: 15, 100_000: 7}  # files: rounds of paired runs
 LISTS = (100, 1_000)
 LIST_ROUNDS = 5
-# A list costs libgit2 names times files: callgrind would need an hour for 1,000 of 100,000, and many
-# minutes for several counts if one is enough.
+# libgit2 compares each listed name with each file: callgrind would need an hour for 1,000 names among 100,000
+# files, and many minutes for several counts.
 MOST_COMPARISONS = 10_000_000
 MOST_COMPARISONS_COUNTED_OFTEN = 1_000_000
 
@@ -34,7 +34,7 @@ LESS_ALLOCATIONS = 0
 
 
 def slope(values):
-    """What each file adds, from the smallest to the largest working copy: {files: value}."""
+    """Returns the cost of each further file, from the smallest to the largest of {files: value}."""
     small, large = min(values), max(values)
     return (values[large] - values[small]) / (large - small)
 
@@ -51,7 +51,7 @@ class Bench:
         self._roots = {size: os.path.join(scratch, name) for size, name in zip(sizes, "abc")}
 
     def serving(self):
-        """A context in which there are servers for what is measured with them."""
+        """Returns a context with the servers that the measurements need."""
         home = os.path.join(self._scratch, "home")
         os.mkdir(home)
         self._env = working_copies.environment(home)
@@ -75,8 +75,8 @@ class Bench:
                 if size * count <= MOST_COMPARISONS]
 
     def count(self):
-        """Counts instructions and allocations; several runs at once, since neither depends on the
-        clock."""
+        """Counts instructions and allocations. Several runs at once are possible, because neither
+        depends on the clock."""
         programs = self._programs
         some = self._roots[self._sizes[0]]
         tasks = {
@@ -113,7 +113,7 @@ class Bench:
              for program in ("floor", "library")}, COUNTS if often else 1)
 
     def clock(self):
-        """Times floor, library and git as a child process, nothing else running."""
+        """Times the floor, the library and git as a child process, one after the other."""
         self._rounds = {}
         for size, root in self._roots.items():
             self._rounds[size] = self._programs.clock(
@@ -223,7 +223,7 @@ def parse():
     parser = argparse.ArgumentParser(description=__doc__)
     parser.add_argument("--build", required=True, help="the build folder")
     parser.add_argument("--scratch", required=True, help="an empty folder with a short name")
-    parser.add_argument("--quick", action="store_true", help="without the largest working copy")
+    parser.add_argument("--quick", action="store_true", help="leaves out the largest working copy")
     parser.add_argument("--page", help="file to write the tables into")
     return parser.parse_args()
 

@@ -18,7 +18,7 @@ OPERATIONS = (("folder", "states of all files"), ("add", "one file added"),
 
 
 class WorkingCopy:
-    """A working copy, and something to do in it for each run."""
+    """A working copy, and a change in it for each run."""
 
     def __init__(self, programs, root, size, env):
         self._programs = programs
@@ -28,7 +28,7 @@ class WorkingCopy:
         working_copies.make_working_copy(root, size, env)
 
     def peaks(self, operation):
-        """KiB of the library, the floor and git."""
+        """Returns the KiB of the library, the floor and git."""
         if operation == "folder":
             runs = (("library", "folder", self._root), ("floor", "folder", self._root),
                     ("floor", "child", self._root))
@@ -44,7 +44,7 @@ class WorkingCopy:
         return peaks
 
     def _change(self, operation):
-        """A new file to be added, or a change of a tracked one."""
+        """Makes a new file to add, or changes a tracked one."""
         self._runs += 1
         name = working_copies.name_of(0) if operation == "commit" else f"new-{self._runs}"
         if operation != "folder":

@@ -1,5 +1,5 @@
 # SPDX-License-Identifier: MIT
-"""Runs the measured programs and reads what they say."""
+"""Runs the measured programs and reads their output."""
 
 import glob
 import os
@@ -16,8 +16,8 @@ DISPLACEMENT = 528
 
 
 class Programs:
-    """The programs of one build, in one environment. Each run gives what its measured region gave,
-    by name."""
+    """The programs of one build, in one environment. Each run returns the results of its measured
+    region, by name."""
 
     def __init__(self, build, scratch):
         self._build = os.path.join(build, "bench")
@@ -37,8 +37,8 @@ class Programs:
         return {name: int(value) for name, value in pairs}
 
     def count_in_turn(self, commands, counts=COUNTS, before=lambda: None):
-        """How many instructions the region of each command usually takes: {name: median}. Calls
-        `before` before each run."""
+        """Returns the instructions of the region of each command: {name: median}. Calls `before` before
+        each run."""
         counted = {name: [] for name in commands}
         for number in range(counts):
             for name, command in commands.items():
@@ -48,7 +48,7 @@ class Programs:
         return {name: statistics.median(numbers) for name, numbers in counted.items()}
 
     def instructions(self, program, *arguments, displacement=0):
-        """How many instructions callgrind counts in the region, with the heap moved by so many
+        """Returns the instructions that callgrind counts in the region, with the heap moved by some
         bytes."""
         name = "-".join([program, *arguments]).replace("/", "_")
         counts = os.path.join(self._scratch, f"callgrind{name}")
@@ -61,14 +61,14 @@ class Programs:
         return int(totals[0].split()[1])
 
     def allocations(self, program, *arguments):
-        """What the region allocates, as the preloaded library counts it."""
+        """Returns the allocations of the region, which the preloaded library counts."""
         library = os.path.join(self._build, "libvclink_bench_allocations.so")
         return self.run(program, *arguments, env={**self._env, "LD_PRELOAD": library})
 
     def clock(self, commands, rounds, before=lambda: None, added=None):
-        """Runs all commands once a round, each second round backwards, after one round for the
-        system's caches. Calls `before` before each, and adds to the environment. Gives the rounds:
-        the times in the order of the commands."""
+        """Runs all commands once in each round, in every second round backwards, after one round for
+        the system's caches. Calls `before` before each command, and adds `added` to the environment.
+        Returns for each round the times in the order of the commands."""
         env = {**self._env, **(added or {})}
         times = []
         for number in range(rounds + 1):
@@ -82,7 +82,7 @@ class Programs:
 
 
 class Ratios:
-    """Ratios of paired times: median, smallest, largest."""
+    """Returns median, smallest and largest ratio of paired times."""
 
     def __init__(self, rounds, above, below):
         ratios = sorted(times[above] / times[below] for times in rounds)

@@ -11,8 +11,8 @@ from report import Table
 
 LIMIT = 1.03
 ROUNDS = 5
-# A pack comes in pieces of this size now and of that the next time, which libgit2 copies more or less
-# often: up to 2 % of a call.
+# A pack arrives in pieces of different sizes each time, so libgit2 copies it more or less often. That is up to 2 %
+# of a call.
 COUNTS_OF_PIECES = 9
 CLONED = 10_000
 COMMITS = 1_000
@@ -20,7 +20,7 @@ HEADS = 10_000
 
 
 def commit_stream(count):
-    """What git fast-import takes: so many further commits on main, of one file each."""
+    """Returns the input of git fast-import for further commits on main, of one file each."""
     for number in range(count):
         text = b"int later%d();\n" % number
         yield b"commit refs/heads/main\ncommitter bench <bench@localhost> %d +0000\n" % (
@@ -31,7 +31,7 @@ def commit_stream(count):
 
 
 class Operation:
-    """One operation with a remote of its own; what it changes is put back before each run."""
+    """One operation with a remote of its own. Its changes are undone before each run."""
 
     def __init__(self, operation, title, counts=COUNTS, by_path=False):
         self.operation = operation
@@ -92,7 +92,7 @@ class Operation:
 
 
 class RemoteBench:
-    """What is measured here needs a server: see serve()."""
+    """The operations with remotes. They need a server: see serve()."""
 
     def __init__(self, programs, scratch):
         self._programs = programs
@@ -109,13 +109,13 @@ class RemoteBench:
             operation.make(self._folder, self._daemon.url, env)
 
     def serve(self, env):
-        """A context in which the remotes are served, and all else has to happen."""
+        """Returns a context with a server of the remotes, in which all measurements must run."""
         os.mkdir(self._folder)
         self._daemon = Daemon(self._folder, env)
         return self._daemon
 
     def tasks(self):
-        """One task an operation, since its runs take turns with one remote."""
+        """Returns one task for each operation, because its runs take turns with one remote."""
         return {("remote", operation.title): lambda o=operation: self._count(o)
                 for operation in self._operations}
 

@@ -1,5 +1,5 @@
 # SPDX-License-Identifier: MIT
-"""The table of results, its limits and verdicts, and the page that they are in."""
+"""The table of results with limits and verdicts, and its page."""
 
 import sys
 
@@ -20,7 +20,7 @@ class Table:
         self.failed = []
 
     def row(self, what, values, limit=None, measured=()):
-        """One row. With a limit, each number of `measured` must not be above it."""
+        """Adds a row. If there is a limit, no number of `measured` may be above it."""
         verdict = ""
         if limit is not None:
             passed = all(number <= limit for number in measured)
@@ -36,11 +36,11 @@ class Table:
 
 
 def write_into(page, text):
-    """Puts the text between the page's markers."""
+    """Writes the text between the page's markers."""
     with open(page, encoding="utf-8") as file:
         content = file.read()
     if content.count(BEGIN) != 1 or content.count(END) != 1:
-        sys.exit(f"bench: {page} does not have the two markers of the table once each")
+        sys.exit(f"bench: {page} must have each marker of the table exactly once")
     before, rest = content.split(BEGIN)
     after = rest.split(END)[1]
     with open(page, "w", encoding="utf-8") as file:

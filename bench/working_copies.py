@@ -1,11 +1,11 @@
 # SPDX-License-Identifier: MIT
-"""Makes the working copies that are measured, and lists of files in them."""
+"""Makes working copies for measurements, and lists of files in them."""
 
 import os
 import subprocess
 import time
 
-# What git and libgit2 read of the person's own set-up, kept away from both.
+# Keeps the user's own configuration away from git and libgit2.
 HERMETIC = {
     "GIT_AUTHOR_NAME": "bench",
     "GIT_AUTHOR_EMAIL": "bench@localhost",
@@ -17,18 +17,18 @@ HERMETIC = {
 
 
 def environment(home):
-    """The environment in which all programs run, HOME and XDG folders being an empty folder."""
+    """Returns the environment of all programs. HOME and the XDG folders are an empty folder."""
     inherited = {name: os.environ[name] for name in ("PATH", "TMPDIR") if name in os.environ}
     return {**inherited, **HERMETIC, "HOME": home, "XDG_CONFIG_HOME": home, "LD_BIND_NOW": "1"}
 
 
 def name_of(number):
-    """A path of 40 characters; 20 files a folder, 10 such folders in the folder above."""
+    """Returns a path of 40 characters. Each folder has 20 files, each folder above has 10 folders."""
     return f"source/module-{number // 200:03d}/section-{number // 20 % 10:02d}/f-{number:05d}.cpp"
 
 
 def export_stream(count):
-    """What git fast-import takes: one commit of so many small files."""
+    """Returns the input of git fast-import for one commit of `count` small files."""
     yield b"commit refs/heads/main\ncommitter bench <bench@localhost> 1700000000 +0000\n"
     yield b"data 5\nfiles\n"
     for number in range(count):
@@ -42,7 +42,7 @@ def git(root, env, *arguments, **options):
 
 
 def make_repository(root, env, *options):
-    """An empty repository."""
+    """Makes an empty repository."""
     subprocess.run(["git", "init", "--quiet", "--initial-branch=main", *options, root], env=env,
                    check=True)
     # libgit2 reads no identity from the environment.
@@ -51,8 +51,8 @@ def make_repository(root, env, *options):
 
 
 def make_working_copy(root, count, env):
-    """A clean working copy. Its files are older than its index, so that a walk trusts the index's
-    file times and reads no content."""
+    """Makes a clean working copy. Its files are older than its index, so that a walk trusts the
+    index's file times and reads no content."""
     make_repository(root, env)
     git(root, env, "fast-import", "--quiet", input=b"".join(export_stream(count)))
     git(root, env, "read-tree", "HEAD")

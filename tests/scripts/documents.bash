@@ -1,7 +1,7 @@
 #!/usr/bin/env bash
 # SPDX-License-Identifier: MIT
-# documents.bash SOURCE: what scripts/evidence keeps of the output of measurements and writes into the
-# documents, and what scripts/release-notes makes of the change log, in a small repository of its own.
+# documents.bash SOURCE: tests in a small repository which results scripts/evidence reads from the output of
+# measurements and writes into the documents, and which notes scripts/release-notes prints.
 set -euo pipefail
 
 source=$1
@@ -34,7 +34,7 @@ complain()
     } >&2
 }
 
-# run STATUS COMMAND...
+# run STATUS COMMAND...: the command must end with this status.
 run()
 {
     local expected=$1 status=0
@@ -43,7 +43,7 @@ run()
     ((status == expected)) || complain "$*: status $status, not $expected"
 }
 
-# reads NAME RESULT: of the log on standard input.
+# reads NAME RESULT: scripts/evidence must find the result in the log on standard input.
 reads()
 {
     cat >"$copy/log"
@@ -116,14 +116,14 @@ paths: 300 inputs tried, cov: 10
 text: 1000 inputs tried, cov: 10
 END_OF_LOG
 
-# What is not there is not kept.
+# A log without a result changes nothing.
 cp docs/figures.tsv "$copy/figures"
 echo 'libgit2: 372 places, 4152 runs, 1 failed tests' >"$copy/log"
 run 1 scripts/evidence read faults "$copy/log"
 cmp -s docs/figures.tsv "$copy/figures" || complain "a failure was kept"
 run 2 scripts/evidence read owls "$copy/log"
 
-# A change of the library shows.
+# A plus sign shows that the library differs from the commit.
 run 0 scripts/evidence --check
 echo 'int owl;' >main/owl.cpp
 printf 'seeds 0 to 9\n' >"$copy/log"

@@ -1,7 +1,7 @@
 #!/usr/bin/env bash
 # SPDX-License-Identifier: MIT
-# lint.bash TIDY: which units scripts/lint has clang-tidy read, and which it knows to be clean, in a
-# small repository of its own.
+# lint.bash TIDY: tests in a small repository which units scripts/lint reads with clang-tidy, and which it knows to
+# be clean.
 set -euo pipefail
 
 tidy=$1
@@ -15,7 +15,7 @@ export GIT_COMMITTER_NAME=A GIT_COMMITTER_EMAIL=a@example.org
 unset CMAKE_CXX_COMPILER_LAUNCHER CMAKE_C_COMPILER_LAUNCHER
 output=$copy/output
 
-# lint STATUS OPTION...: has what has changed since the last commit read.
+# lint STATUS OPTION...: reads what has changed since the last commit; it must end with this status.
 lint()
 {
     local expected=$1 status=0
@@ -38,7 +38,7 @@ says()
     grep -qE -- "$1" "$output" || complain "does not say: $1"
 }
 
-# case TEXT: what follows, on the files as they were committed and with nothing known.
+# case TEXT: begins a test with the committed files, and with no unit known to be clean.
 case_of()
 {
     what=$1

@@ -1,7 +1,7 @@
 #!/usr/bin/env bash
 # SPDX-License-Identifier: MIT
-# words.bash WORDS: what scripts/lint counts as a phrase that is hard to read, and as a misspelt word, in a
-# small repository of its own.
+# words.bash WORDS: tests in a small repository what scripts/lint counts as a phrase that is hard to read, and as a
+# misspelt word.
 set -euo pipefail
 
 words=$1
@@ -12,7 +12,7 @@ trap 'rm -rf "$copy"' EXIT
 export HOME=$copy GIT_CONFIG_NOSYSTEM=1
 output=$copy/output
 
-# words STATUS: checks the repository.
+# words STATUS: checks the repository; the check must end with this status.
 words()
 {
     local expected=$1 status=0
@@ -35,7 +35,7 @@ says()
     grep -qE -- "$1" "$output" || complain "does not say: $1"
 }
 
-# case TEXT: what follows, on the files as they were at first.
+# case TEXT: begins a test with the first state of the files.
 case_of()
 {
     what=$1
