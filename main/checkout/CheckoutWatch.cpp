@@ -12,6 +12,7 @@
 #include "error/errorUtil/callbackException.hpp"
 #include "error/errorUtil/libgit2Errors.hpp"
 #include "main/checkout/MergeBases.hpp"
+#include "main/checkout/RenamesToFolders.hpp"
 #include "main/checkout/conflictLocks.hpp"
 #include "main/checkout/gitlinks.hpp"
 #include "main/checkout/obstaclesAhead.hpp"
@@ -163,6 +164,7 @@ void CheckoutWatch::lookBeforeMerge(const git_oid *theirs)
             bases.size() != 0 ? treeOf(repository_, bases.at(i)) : nullptr;
         Finding found;
         RenamedLocks renamed;
+        RenamesToFolders toFolders;
         visitTreeChanges(repository_, before.get(), after.get(),
                          [&](const TreeChange &change)
                          {
@@ -172,6 +174,7 @@ void CheckoutWatch::lookBeforeMerge(const git_oid *theirs)
                                  found = findLockOfConflict(repository_, copy, change, after.get());
                              }
                              renamed.note(copy, change);
+                             toFolders.note(copy, change);
                              merged_.noteChange(copy, change);
                              yielding = firstOf(yielding, findYielding(copy, change));
                              mayBeRenamed = mayBeRenamed || isDeletedByBoth(copy, change);
@@ -180,6 +183,10 @@ void CheckoutWatch::lookBeforeMerge(const git_oid *theirs)
         if (!found)
         {
             found = renamed.find(repository_, copy, before.get(), after.get());
+        }
+        if (!found)
+        {
+            found = toFolders.find(repository_, copy, before.get(), after.get());
         }
         first = firstOf(first, found);
     }

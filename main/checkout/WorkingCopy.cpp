@@ -23,14 +23,6 @@ namespace vclink::git
 namespace
 {
 
-struct FreeTreeEntry
-{
-    void operator()(git_tree_entry *entry) const
-    {
-        git_tree_entry_free(entry);
-    }
-};
-
 OwnedHandle<git_tree> headTreeOf(git_repository *repository, const git_reference *head)
 {
     const OwnedHandle<git_object> object =
@@ -225,6 +217,19 @@ const git_index_entry *WorkingCopy::entryOf(const std::string &name)
     return entry_;
 }
 
+bool WorkingCopy::hasEntryBelow(const std::string &folder) const
+{
+    const std::string prefix = folder + '/';
+    const GitResult<void> found =
+        call(git_index_find_prefix, nullptr, index_.get(), prefix.c_str());
+    if (found.has_error() && found.error().getCode() == GIT_ENOTFOUND)
+    {
+        return false;
+    }
+    found.value();
+    return true;
+}
+
 bool WorkingCopy::isInHead(const std::string &name) const
 {
     return typeInHead(name) != GIT_OBJECT_INVALID;
@@ -312,19 +317,8 @@ git_oid WorkingCopy::idOf(const std::string &name, Standing standing) const
 /// Returns GIT_OBJECT_INVALID if HEAD does not have the name.
 git_object_t WorkingCopy::typeInHead(const std::string &name) const
 {
-    if (head_ == nullptr)
-    {
-        return GIT_OBJECT_INVALID;
-    }
-    git_tree_entry *raw = nullptr;
-    const GitResult<void> found = call(git_tree_entry_bypath, &raw, head_.get(), name.c_str());
-    const std::unique_ptr<git_tree_entry, FreeTreeEntry> entry(raw);
-    if (found.has_error() && found.error().getCode() == GIT_ENOTFOUND)
-    {
-        return GIT_OBJECT_INVALID;
-    }
-    found.value();
-    return git_tree_entry_type(entry.get());
+    const OwnedTreeEntry entry = findInTree(head_.get(), name);
+    return entry != nullptr ? git_tree_entry_type(entry.get()) : GIT_OBJECT_INVALID;
 }
 
 } // namespace vclink::git

@@ -67,6 +67,9 @@ class WorkingCopy
     /// since several rules ask for it.
     const git_index_entry *entryOf(const std::string &name);
 
+    /// Returns true if the index has anything below a folder of this name.
+    [[nodiscard]] bool hasEntryBelow(const std::string &folder) const;
+
     /// Forgets folders and entry. To be called when files or the index may have changed.
     void forget();
 

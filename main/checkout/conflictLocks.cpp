@@ -77,25 +77,11 @@ bool isConflict(git_repository *repository, const git_index_entry &ours, const T
     return isConflict(repository, change.before != nullptr ? &before : nullptr, ours, theirs);
 }
 
-bool isInTree(const git_tree *tree, const std::string &path)
-{
-    git_tree_entry *raw = nullptr;
-    const GitResult<void> found = call(git_tree_entry_bypath, &raw, tree, path.c_str());
-    const std::unique_ptr<git_tree_entry, void (*)(git_tree_entry *)> entry(raw,
-                                                                            git_tree_entry_free);
-    if (found.has_error() && found.error().getCode() == GIT_ENOTFOUND)
-    {
-        return false;
-    }
-    check(found);
-    return true;
-}
-
 /// A missing tracked file is restored before the conflicts are written.
 bool isThere(WorkingCopy &copy, const std::string &path, const git_tree *theirs)
 {
     return copy.at(path) != Standing::Nothing || copy.entryOf(path) != nullptr ||
-           isInTree(theirs, path);
+           findInTree(theirs, path) != nullptr;
 }
 
 Obstacle besideLock(const std::string &path)

@@ -5,6 +5,7 @@
 #include <utility>
 #include <vector>
 
+#include <git2/errors.h>
 #include <git2/tree.h>
 
 #include "error/errorUtil/GitResult.hpp"
@@ -104,6 +105,23 @@ std::pair<const git_tree_entry *, const git_tree_entry *> takeNext(Level &level)
 }
 
 } // namespace
+
+OwnedTreeEntry findInTree(const git_tree *tree, const std::string &path)
+{
+    if (tree == nullptr)
+    {
+        return nullptr;
+    }
+    git_tree_entry *raw = nullptr;
+    const GitResult<void> found = call(git_tree_entry_bypath, &raw, tree, path.c_str());
+    OwnedTreeEntry entry(raw);
+    if (found.has_error() && found.error().getCode() == GIT_ENOTFOUND)
+    {
+        return nullptr;
+    }
+    check(found);
+    return entry;
+}
 
 void visitTreeChanges(git_repository *repository, const git_tree *before, const git_tree *after,
                       const std::function<bool(const TreeChange &)> &visit)

@@ -2,6 +2,7 @@
 #pragma once
 
 #include <functional>
+#include <memory>
 #include <string>
 
 #include <git2/index.h>
@@ -30,6 +31,20 @@ inline bool isOf(const git_index_entry &entry, const git_tree_entry *side)
     return side != nullptr && isSameId(entry.id, *git_tree_entry_id(side)) &&
            entry.mode == static_cast<unsigned>(git_tree_entry_filemode(side));
 }
+
+struct FreeTreeEntry
+{
+    void operator()(git_tree_entry *entry) const
+    {
+        git_tree_entry_free(entry);
+    }
+};
+using OwnedTreeEntry = std::unique_ptr<git_tree_entry, FreeTreeEntry>;
+
+/// Returns the tree's file or folder of this name, null if it has none. git_tree_entry_bypath.
+/// @param tree null means the empty tree
+/// @throws LibGit2Exception if a tree on the way cannot be read
+OwnedTreeEntry findInTree(const git_tree *tree, const std::string &path);
 
 /// Visits what differs, in path order, until `visit` returns false. Does not read equal folders.
 /// git_diff_tree_to_tree returns the same at several times the cost.

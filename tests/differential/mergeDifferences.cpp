@@ -161,22 +161,11 @@ std::string MergeExplanations::explain(const std::string &path, const MergedPath
     {
         return "git merges the sides of a renamed file under one name, libgit2 keeps them apart";
     }
-    if (isRenamedOntoFolder(path))
-    {
-        return "libgit2 loses one of a renamed file and a folder of its name";
-    }
     if (!sameEntries && isAnotherInEachBase(path))
     {
         return "git and libgit2 merge several merge bases to another one";
     }
     return {};
-}
-
-bool MergeExplanations::hasFolderInTheWay() const
-{
-    const auto isInTheWay = [this](const auto &file) { return isFolderInTheWay(file.first); };
-    return std::any_of(ours_.begin(), ours_.end(), isInTheWay) ||
-           std::any_of(theirs_.begin(), theirs_.end(), isInTheWay);
 }
 
 bool MergeExplanations::hasTwoFiles(const std::string &path) const
@@ -265,11 +254,7 @@ bool MergeExplanations::areSidesAsTheyWere(const std::multiset<std::string> &ent
 
 bool MergeExplanations::isRenamedOntoFolder(const std::string &path) const
 {
-    return std::any_of(renamed_.begin(), renamed_.end(),
-                       [&](const std::string &renamed) {
-                           return isFolderInTheWay(renamed) &&
-                                  (path == renamed || isIn(path, renamed));
-                       });
+    return renamed_.count(path) != 0 && isFolderInTheWay(path);
 }
 
 bool MergeExplanations::isAnotherInEachBase(const std::string &path) const

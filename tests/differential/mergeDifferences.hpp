@@ -44,8 +44,8 @@ class MergeExplanations
     /// The name of the rule that explains the difference in one path; empty where none does.
     std::string explain(const std::string &path, const MergedPaths &byLibrary,
                         const MergedPaths &byGit) const;
-    /// Whether a path is a file on one side and a folder on the other.
-    bool hasFolderInTheWay() const;
+    /// Whether one side has renamed a file to this name, and the other has a folder there.
+    bool isRenamedOntoFolder(const std::string &path) const;
     /// Whether both sides have a file there that is no link, so that lines may be compared.
     bool hasTwoFiles(const std::string &path) const;
 
@@ -60,7 +60,6 @@ class MergeExplanations
     bool isAddedWithTwoModes(const std::string &path) const;
     /// Whether each entry is one that a side has somewhere, so that none is a result.
     bool areSidesAsTheyWere(const std::multiset<std::string> &entries) const;
-    bool isRenamedOntoFolder(const std::string &path) const;
     bool isAnotherInEachBase(const std::string &path) const;
 
     /// Of each merge base, of ours and of theirs, mode and id by path.

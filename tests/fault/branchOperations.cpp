@@ -137,6 +137,7 @@ std::vector<Operation> branchOperations()
         {"mergeBesideHidden", makeHidden, doing(merge), badState, abortHidden},
         {"mergeOverIgnored", makeIgnored, doing(merge), badState, abort},
         {"mergeBesideLock", makeMergedBesideLock, doing(merge), badState, abort},
+        {"mergeFileAndFolder", makeFileAndFolder, doing(merge), badState, abort},
         {"mergeSubmodules", makeDivergedSubmodules, doing(merge), badState, abort},
         {"mergeConflict", makeConflict, doing(merge), badState, abort},
         {"mergeUnmergeable", makeUnmergeableConflict, doing(merge), badState, abort},

@@ -158,9 +158,14 @@ std::vector<Tolerance> tolerancesOfOthers(const std::string &operation, const st
         {"getRemoteBranches", "git_branch_next", 1, GIT_ITEROVER, "done: "},
         {"getRemoteBranches", "git_branch_next", 2, GIT_ITEROVER, normal},
         {"merge", "git_index_conflict_next", any, GIT_ITEROVER, normal},
+        // Nothing in the index below a name.
+        {"", "git_index_find_prefix", any, GIT_ENOTFOUND, normal},
         // A submodule need not be in .gitmodules.
         {"", "git_submodule_lookup", any, GIT_ENOTFOUND, normal},
         // A name that HEAD does not have, and histories without a common commit.
+        {"mergeFileAndFolder", "git_tree_entry_bypath", 1, GIT_ENOTFOUND,
+         failureIn(operation, GIT_ECONFLICT, GIT_ERROR_CHECKOUT,
+                   "the folder 'new' is in the way of the checkout")},
         {"", "git_tree_entry_bypath", any, GIT_ENOTFOUND, normal},
         // Both sides have added the file then, for all one knows. What the call has given counts.
         {"mergeBesideLock", "git_merge_bases", any, GIT_ENOTFOUND, normal, true},
@@ -182,6 +187,7 @@ std::vector<Tolerance> tolerancesOfOthers(const std::string &operation, const st
         {"mergeBesideHidden", "git_diff_tree_to_tree", any, any, normal, true},
         {"mergeOverIgnored", "git_diff_tree_to_tree", any, any, normal, true},
         {"mergeBesideLock", "git_diff_tree_to_tree", any, any, normal, true},
+        {"mergeFileAndFolder", "git_diff_tree_to_tree", 2, any, normal, true},
         {"mergeSubmodules", "git_diff_tree_to_tree", any, any, normal, true},
         {"merge", "git_index_has_conflicts", any, any, hasConflicts},
         // The first look-up chooses the words of the message, the second is the commit's, after

@@ -233,6 +233,17 @@ void makeMergedBesideLock(GitRepository &repository)
     repository.commitAll("on main");
 }
 
+void makeFileAndFolder(GitRepository &repository)
+{
+    makePlain(repository);
+    repository.git({"checkout", "--quiet", "-b", "topic"});
+    repository.write("new", "theirs\n");
+    repository.commitAll("on topic");
+    repository.git({"checkout", "--quiet", "main"});
+    repository.write("new/inside", "ours\n");
+    repository.commitAll("on main");
+}
+
 void makeUnmergeableConflict(GitRepository &repository)
 {
     makeConflictUnder(repository, "file -merge\n");

@@ -53,6 +53,8 @@ void makeMerging(GitRepository &repository);
 void makeConflict(GitRepository &repository);
 /// Main and topic change other lines of "file", and "topic" adds "file.lock".
 void makeMergedBesideLock(GitRepository &repository);
+/// "new" is a folder of ours and a file of theirs.
+void makeFileAndFolder(GitRepository &repository);
 /// Conflict, "file" being one that must not hold markers.
 void makeUnmergeableConflict(GitRepository &repository);
 /// Conflict, a configured command merging the file.

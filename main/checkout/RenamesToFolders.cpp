@@ -1,0 +1,127 @@
+// SPDX-License-Identifier: MIT
+#include "main/checkout/RenamesToFolders.hpp"
+
+#include <cstddef>
+#include <limits>
+#include <memory>
+
+#include <git2/diff.h>
+#include <git2/errors.h>
+#include <git2/tree.h>
+
+#include "error/errorUtil/GitResult.hpp"
+#include "main/checkout/gitlinks.hpp"
+
+namespace vclink::git
+{
+namespace
+{
+
+using Diff = std::unique_ptr<git_diff, void (*)(git_diff *)>;
+
+Diff compare(git_repository *repository, git_tree *before, git_tree *after)
+{
+    git_diff *raw = nullptr;
+    const GitResult<void> compared =
+        call(git_diff_tree_to_tree, &raw, repository, before, after, nullptr);
+    Diff diff(raw, git_diff_free);
+    check(compared);
+    return diff;
+}
+
+/// Marks what a merge can take for a rename. It counts from a similarity of 50 % on; the rest is
+/// for differences between the two searches.
+void findRenames(git_diff *diff)
+{
+    git_diff_find_options options{};
+    check(git_diff_find_options_init, &options, unsigned{GIT_DIFF_FIND_OPTIONS_VERSION});
+    options.flags = GIT_DIFF_FIND_RENAMES;
+    options.rename_threshold = 40;
+    options.rename_limit = std::numeric_limits<unsigned short>::max();
+    check(git_diff_find_similar, diff, &options);
+}
+
+/// Returns true if both trees have the folder, with the same content.
+bool isSameFolder(const git_tree *left, const git_tree *right, const std::string &path)
+{
+    const OwnedTreeEntry leftEntry = findInTree(left, path);
+    const OwnedTreeEntry rightEntry = findInTree(right, path);
+    return leftEntry != nullptr && rightEntry != nullptr &&
+           isSameId(*git_tree_entry_id(leftEntry.get()), *git_tree_entry_id(rightEntry.get()));
+}
+
+Finding findRenameTo(git_repository *repository, git_tree *before, git_tree *after,
+                     const std::set<std::string> &files)
+{
+    if (files.empty())
+    {
+        return {};
+    }
+    const Diff diff = compare(repository, before, after);
+    findRenames(diff.get());
+    const std::size_t count = git_diff_num_deltas(diff.get());
+    for (std::size_t i = 0; i < count; ++i)
+    {
+        const git_diff_delta *const delta = git_diff_get_delta(diff.get(), i);
+        if (delta != nullptr && delta->status == GIT_DELTA_RENAMED &&
+            files.count(delta->new_file.path) != 0)
+        {
+            const std::string name = delta->new_file.path;
+            return Obstacle{name, "'" + name +
+                                      "' is a renamed file of one side and a folder of the other: "
+                                      "merge with 'git merge'"};
+        }
+    }
+    return {};
+}
+
+} // namespace
+
+void RenamesToFolders::note(WorkingCopy &copy, const TreeChange &change)
+{
+    if (change.after == nullptr || copy.entryOf(change.path) != nullptr)
+    {
+        return;
+    }
+    if (change.before == nullptr && !isGitlink(change.after) && copy.hasEntryBelow(change.path))
+    {
+        filesOfTheirs_.insert(change.path);
+    }
+    noteFileAbove(copy, change.path);
+}
+
+void RenamesToFolders::noteFileAbove(WorkingCopy &copy, const std::string &path)
+{
+    const std::size_t size = path.rfind('/') + 1;
+    if (path.compare(0, size, folder_) == 0)
+    {
+        return;
+    }
+    folder_ = path.substr(0, size);
+    for (auto end = path.find('/'); end != std::string::npos; end = path.find('/', end + 1))
+    {
+        const std::string above = path.substr(0, end);
+        const git_index_entry *const entry = copy.entryOf(above);
+        if (entry != nullptr && !isGitlink(entry))
+        {
+            filesOfOurs_.insert(above);
+        }
+    }
+}
+
+Finding RenamesToFolders::find(git_repository *repository, const WorkingCopy &copy,
+                               git_tree *before, git_tree *theirs) const
+{
+    std::set<std::string> files;
+    for (const std::string &file : filesOfTheirs_)
+    {
+        if (!isSameFolder(before, copy.head(), file))
+        {
+            files.insert(file);
+        }
+    }
+    Finding found = findRenameTo(repository, before, theirs, files);
+    return found ? found : findRenameTo(repository, before, copy.head(), filesOfOurs_);
+}
+
+} // namespace vclink::git

@@ -1,0 +1,42 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <set>
+#include <string>
+
+#include <git2/types.h>
+
+#include "main/checkout/Obstacle.hpp"
+#include "main/checkout/WorkingCopy.hpp"
+#include "main/checkout/treeChanges.hpp"
+
+namespace vclink::git
+{
+
+/// A rule of a merge: finds a file that one side has renamed to the name of a folder in which the
+/// other side has added or changed something. libgit2 would fail in the middle of its writing, or
+/// merge neither the file nor the folder. If the file is new, libgit2 has a conflict instead.
+class RenamesToFolders
+{
+  public:
+    /// Notes a name that is a file of one side and a folder of the other.
+    /// @throws LibGit2Exception
+    void note(WorkingCopy &copy, const TreeChange &change);
+
+    /// Looks for renames among the noted files. Compares the trees only if there are any.
+    /// @param before the tree of a merge base, null for the empty tree
+    /// @param theirs the other side's tree
+    /// @throws LibGit2Exception
+    Finding find(git_repository *repository, const WorkingCopy &copy, git_tree *before,
+                 git_tree *theirs) const;
+
+  private:
+    void noteFileAbove(WorkingCopy &copy, const std::string &path);
+
+    std::set<std::string> filesOfOurs_;
+    std::set<std::string> filesOfTheirs_;
+    /// The folder whose parents were looked up last: names come in the order of folders.
+    std::string folder_;
+};
+
+} // namespace vclink::git
