@@ -19,6 +19,7 @@
 #include "main/merge/BranchMerger.hpp"
 #include "options/gitRecords.hpp"
 #include "util/lock/IndexLock.hpp"
+#include "util/lock/PackedReferences.hpp"
 #include "util/lock/referenceLocks.hpp"
 #include "util/repository/objectIds.hpp"
 #include "util/repository/repository.hpp"
@@ -52,6 +53,21 @@ std::vector<BranchPointer> listBranches(git_branch_t type, git_repository *repos
 OwnedHandle<git_reference> lookupLocalBranch(git_repository *repository, const char *name)
 {
     return acquire<git_reference>(git_branch_lookup, repository, name, GIT_BRANCH_LOCAL).value();
+}
+
+/// Returns zeros for a symbolic reference.
+git_oid targetOf(const git_reference *reference)
+{
+    const git_oid *const target = git_reference_target(reference);
+    return target != nullptr ? *target : git_oid{};
+}
+
+/// Returns true if there is a local branch of this name at this commit.
+bool isBranchAt(git_repository *repository, const char *name, const git_oid &id)
+{
+    const GitResult<OwnedHandle<git_reference>> branch =
+        acquire<git_reference>(git_branch_lookup, repository, name, GIT_BRANCH_LOCAL);
+    return branch.has_value() && isSameId(targetOf(branch.value().get()), id);
 }
 
 /// Reads the result of a function that returns 1 or 0.
@@ -166,6 +182,7 @@ void BasicBranchManager::deleteBranch(const BranchName &name)
     const char *const shortName = asGitString(name);
     OwnedHandle<git_repository> repository = adapter_.getRepository();
     bool isFirstTry = true;
+    git_oid id{};
     const auto deleteOnce = [&]
     {
         if (!std::exchange(isFirstTry, false))
@@ -175,9 +192,19 @@ void BasicBranchManager::deleteBranch(const BranchName &name)
             repository = adapter_.getRepository();
         }
         const OwnedHandle<git_reference> branch = lookupLocalBranch(repository.get(), shortName);
+        id = targetOf(branch.get());
         return call(git_branch_delete, branch.get());
     };
-    check(retryWhileLocked(repository.get(), deleteOnce));
+    PackedReferences packed(repository.get());
+    const auto lock = [&packed] { return packed.lock(); };
+    // First, so that a permanent lock fails before anything has changed.
+    check(retryWhileLocked(repository.get(), lock));
+    do
+    {
+        packed.release();
+        check(retryWhileLocked(repository.get(), deleteOnce));
+        check(retryWhileLocked(repository.get(), lock));
+    } while (packed.haveChanged() && isBranchAt(repository.get(), shortName, id));
 }
 
 BranchPointer BasicBranchManager::getCurrentBranch() const

@@ -57,6 +57,44 @@ TEST_F(CallsOnBranches, AreTheseInOrder)
     }
 }
 
+/// git has read the branch before it was deleted, and writes its packed references afterwards.
+TEST_F(CallsOnBranches, DeleteABranchAgainThatIsPackedMeanwhile)
+{
+    repository_.git({"branch", "packed"});
+    const auto twin = makeTwin();
+    twin.git({"pack-refs", "--all"});
+    int deletions = 0;
+    LibGit2Recorder calls;
+    calls.answer<git_branch_delete>(
+        [&](auto *deleteBranch, git_reference *branch)
+        {
+            const int code = deleteBranch(branch);
+            if (++deletions == 1)
+                repository_.write(".git/packed-refs", twin.read(".git/packed-refs"));
+            return code;
+        });
+    branches().deleteBranch("packed");
+    EXPECT_EQ(deletions, 2);
+    EXPECT_FALSE(repository_.tryGit({"rev-parse", "--verify", "packed"}).succeeded());
+}
+
+TEST_F(CallsOnBranches, DeleteNoBranchThatIsMadeMeanwhile)
+{
+    repository_.git({"branch", "packed"});
+    LibGit2Recorder calls;
+    calls.answer<git_branch_delete>(
+        [&](auto *deleteBranch, git_reference *branch)
+        {
+            const int code = deleteBranch(branch);
+            repository_.commit("later");
+            repository_.git({"branch", "packed"});
+            repository_.git({"pack-refs", "--all"});
+            return code;
+        });
+    branches().deleteBranch("packed");
+    EXPECT_EQ(idOf("packed"), idOf("main"));
+}
+
 TEST_F(CallsOnBranches, OfASwitchAreTheseInOrderWithTheRecordOfASafeCheckout)
 {
     makeAhead();

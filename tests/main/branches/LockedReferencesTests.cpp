@@ -50,6 +50,8 @@ const std::vector<ReferenceChange> &referenceChanges()
          [](auto &, auto &branches) { branches.createBranch(BranchParameters("new", "main")); }},
         {"deleteBranch", "refs/heads/loose.lock",
          [](auto &, auto &branches) { branches.deleteBranch("loose"); }},
+        {"deleteBranchBesidePacking", "packed-refs.lock",
+         [](auto &, auto &branches) { branches.deleteBranch("loose"); }},
         {"deletePackedBranch", "packed-refs.lock",
          [](auto &, auto &branches) { branches.deleteBranch("packed"); }}};
     return all;

@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: MIT
 #include <chrono>
+#include <filesystem>
 #include <string>
 
 #include <git2.h>
@@ -8,6 +9,7 @@
 #include "support/GitFixture.hpp"
 #include "support/LibGit2Session.hpp"
 #include "support/text.hpp"
+#include "util/lock/PackedReferences.hpp"
 #include "util/lock/referenceLocks.hpp"
 #include "util/repository/repository.hpp"
 
@@ -128,6 +130,67 @@ TEST(ReferenceLockWait, EndsWithATryWhenTheTimeIsOver)
 TEST(ReferenceLockWait, DoesNotPauseWithoutATime)
 {
     EXPECT_FALSE(ReferenceLockWait(milliseconds(0)).pause());
+}
+
+class PackedReferencesOfARepository : public ReferenceLocks
+{
+  protected:
+    int codeOf(const git::GitResult<void> &result) const
+    {
+        return result.has_error() ? result.error().getCode() : 0;
+    }
+
+    git::OwnedHandle<git_repository> opened_ = open();
+    git::PackedReferences packed_{opened_.get()};
+    const std::filesystem::path lock_ = repository_ / ".git/packed-refs.lock";
+};
+
+TEST_F(PackedReferencesOfARepository, AreLockedAsGitLocksThem)
+{
+    repository_.commit("first");
+    ASSERT_EQ(codeOf(packed_.lock()), 0);
+    EXPECT_FALSE(repository_.tryGit({"pack-refs", "--all"}).succeeded());
+    packed_.release();
+    repository_.git({"pack-refs", "--all"});
+}
+
+TEST_F(PackedReferencesOfARepository, AreLockedByOneAtATime)
+{
+    {
+        git::PackedReferences other(opened_.get());
+        EXPECT_EQ(codeOf(other.lock()), 0);
+        EXPECT_EQ(codeOf(packed_.lock()), GIT_ELOCKED);
+    }
+    EXPECT_EQ(codeOf(packed_.lock()), 0);
+    EXPECT_TRUE(std::filesystem::exists(lock_));
+}
+
+TEST_F(PackedReferencesOfARepository, KeepTheLockOfAnother)
+{
+    repository_.write(".git/packed-refs.lock", "");
+    {
+        git::PackedReferences other(opened_.get());
+        EXPECT_EQ(codeOf(other.lock()), GIT_ELOCKED);
+    }
+    EXPECT_TRUE(std::filesystem::exists(lock_));
+}
+
+TEST_F(PackedReferencesOfARepository, TellWhetherTheyHaveChanged)
+{
+    repository_.commit("first");
+    const auto release = [this]
+    {
+        ASSERT_EQ(codeOf(packed_.lock()), 0);
+        packed_.release();
+    };
+    release();
+    EXPECT_FALSE(packed_.haveChanged());
+    repository_.git({"pack-refs", "--all"});
+    EXPECT_TRUE(packed_.haveChanged());
+    release();
+    EXPECT_FALSE(packed_.haveChanged());
+    repository_.remove(".git/packed-refs");
+    EXPECT_TRUE(packed_.haveChanged());
 }
 
 } // namespace
