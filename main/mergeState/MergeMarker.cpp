@@ -35,33 +35,54 @@ std::string lineOf(const git_oid &id)
     return line;
 }
 
-void writeMarker(const std::string &path, const std::string &text)
+/// Returns the id and the line end of such a file, empty if there is none.
+std::string readIdLine(const std::string &path)
+{
+    const FileDescriptor file(::open(path.c_str(), O_RDONLY | O_CLOEXEC));
+    std::string line(idLineSize, '\0');
+    const ssize_t size = file ? ::read(file.get(), line.data(), line.size()) : 0;
+    line.resize(size > 0 ? static_cast<std::size_t>(size) : 0);
+    return line;
+}
+
+/// Returns 0, or the errno of the call that failed. Then there is no such file.
+int createFile(const std::string &path, const std::string &text) noexcept
 {
     const FileDescriptor file(::open(path.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC,
                                      S_IRUSR | S_IWUSR | S_IRGRP | S_IROTH));
-    if (!file || ::write(file.get(), text.data(), text.size()) != static_cast<ssize_t>(text.size()))
+    if (file && ::write(file.get(), text.data(), text.size()) == static_cast<ssize_t>(text.size()))
     {
-        const int error = errno;
-        ::unlink(path.c_str());
-        raiseSystemError(error, "could not write '" + path + "'");
+        return 0;
     }
+    const int error = errno;
+    ::unlink(path.c_str());
+    return error;
 }
 
 } // namespace
 
 MergeMarker::MergeMarker(git_repository *repository, const MergeSides &sides)
-    : path_(markerPath(repository))
+    : repository_(repository), path_(markerPath(repository)),
+      autoMergePath_(git_repository_path(repository) + std::string("AUTO_MERGE")),
+      autoMerge_(readIdLine(autoMergePath_))
 {
     removeMergeMarker(repository);
-    // git's own sign of a complete merge. libgit2 leaves it when it ends one.
-    const std::string autoMerge = git_repository_path(repository) + std::string("AUTO_MERGE");
-    ::unlink(autoMerge.c_str());
-    writeMarker(path_, lineOf(sides.ours) + lineOf(sides.theirs));
+    // libgit2 leaves it when it ends a merge.
+    ::unlink(autoMergePath_.c_str());
+    const int error = createFile(path_, lineOf(sides.ours) + lineOf(sides.theirs));
+    if (error != 0)
+    {
+        raiseSystemError(error, "could not write '" + path_ + "'");
+    }
 }
 
 MergeMarker::~MergeMarker()
 {
     ::unlink(path_.c_str());
+    if (!autoMerge_.empty() && git_repository_state(repository_) == GIT_REPOSITORY_STATE_NONE)
+    {
+        static_cast<void>(createFile(autoMergePath_, autoMerge_));
+    }
 }
 
 bool hasMergeMarker(git_repository *repository, const git_oid &theirs)

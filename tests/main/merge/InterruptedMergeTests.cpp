@@ -253,6 +253,20 @@ TEST_F(InterruptedMerge, IsNotHiddenByWhatGitLeftOfAnEarlierOne)
     expectRefused();
 }
 
+/// git leaves it behind a cherry-pick that it refuses.
+TEST_F(InterruptedMerge, LeavesWhatGitLeftIfItIsRefused)
+{
+    diverge(writing("file", "ours\n"), writing("theirs", "x"));
+    const std::string tree = repository_.git({"rev-parse", "main^{tree}"});
+    repository_.write(".git/AUTO_MERGE", tree);
+    repository_.write("theirs", "in the way\n");
+    EXPECT_NE(failureOfMerge("topic"), "");
+    EXPECT_EQ(repository_.read(".git/AUTO_MERGE"), tree);
+    repository_.remove("theirs");
+    merge("topic");
+    EXPECT_FALSE(exists(".git/AUTO_MERGE"));
+}
+
 TEST_F(InterruptedMerge, OfNoDifferenceLacksNothing)
 {
     diverge(writing("file", "same\n"), writing("file", "same\n"));
