@@ -60,7 +60,13 @@ class GitAdapter : public vclink::CMAdapter
   private:
     FileStateMap collectFileStates(char **pathspecStrings, std::size_t pathspecCount);
     void addToIndex(const std::vector<upath> &files);
-    void removeFromIndex(const std::vector<upath> &files);
+    /// Files that a sparse checkout leaves out.
+    enum class LeftOutFiles
+    {
+        Kept,
+        Removed
+    };
+    void removeFromIndex(const std::vector<upath> &files, LeftOutFiles leftOut);
     /// @param head one of the parents; null if HEAD has no commit
     void createCommit(git_repository *repository, const ustring &message, const git_commit *head,
                       const std::vector<const git_commit *> &parents, IndexLock &lock);

@@ -26,6 +26,16 @@ int acceptAllPaths(const char * /*path*/, const char * /*matchedPathspec*/, void
     return 0;
 }
 
+/// Makes libgit2 skip files that a sparse checkout leaves out: nobody has deleted them.
+int skipLeftOut(const char *path, const char * /*matchedPathspec*/, void *index)
+{
+    const git_index_entry *const entry =
+        git_index_get_bypath(static_cast<git_index *>(index), path, GIT_INDEX_STAGE_NORMAL);
+    const bool isLeftOut =
+        entry != nullptr && (entry->flags_extended & GIT_INDEX_ENTRY_SKIP_WORKTREE) != 0;
+    return isLeftOut ? 1 : 0;
+}
+
 void refuseNuls(const std::vector<upath> &files)
 {
     for (const upath &file : files)
@@ -65,7 +75,7 @@ void GitAdapter::removeFiles(const std::vector<upath> &files)
     {
         raise(shared_vclink::git::NoFilesToRemove());
     }
-    removeFromIndex(toRemove);
+    removeFromIndex(toRemove, LeftOutFiles::Removed);
 }
 
 void GitAdapter::markResolved(const upath &file)
@@ -76,7 +86,7 @@ void GitAdapter::markResolved(const upath &file)
     }
     else
     {
-        removeFromIndex({file});
+        removeFromIndex({file}, LeftOutFiles::Kept);
     }
 }
 
@@ -101,7 +111,7 @@ void GitAdapter::addToIndex(const std::vector<upath> &files)
     lock.publish();
 }
 
-void GitAdapter::removeFromIndex(const std::vector<upath> &files)
+void GitAdapter::removeFromIndex(const std::vector<upath> &files, LeftOutFiles leftOut)
 {
     if (files.empty())
     {
@@ -112,7 +122,15 @@ void GitAdapter::removeFromIndex(const std::vector<upath> &files)
     IndexLock lock(repository.get());
     const OwnedHandle<git_index> index = getRepositoryIndex(repository.get());
     const PathspecArray pathspec = makeFilePathspec(files, root_);
-    check(git_index_remove_all, index.get(), getArrayPointer(pathspec), acceptAllPaths, this);
+    if (leftOut == LeftOutFiles::Kept)
+    {
+        check(git_index_remove_all, index.get(), getArrayPointer(pathspec), skipLeftOut,
+              index.get());
+    }
+    else
+    {
+        check(git_index_remove_all, index.get(), getArrayPointer(pathspec), acceptAllPaths, this);
+    }
     writeIndex(index.get());
     lock.publish();
 }

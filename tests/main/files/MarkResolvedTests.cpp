@@ -186,6 +186,21 @@ TEST_F(MarkResolved, TakesFilesAndFoldersThatStandInEachOthersPlaces)
     EXPECT_EQ(stateOf(repository_), expected);
 }
 
+TEST_F(MarkResolved, LeavesFilesThatASparseCheckoutLeavesOut)
+{
+    beginMerge({"in/conflict"});
+    repository_.git({"update-index", "--skip-worktree", "file", "sub/inside"});
+    repository_.remove("file");
+    repository_.remove("sub");
+    repository_.remove("in");
+    const RepositoryState expected = stateOf(repository_);
+    markResolved("file");
+    markResolved("sub");
+    EXPECT_EQ(stateOf(repository_), expected);
+    markResolved("in");
+    EXPECT_THAT(status(), ElementsAre("D  in/conflict"));
+}
+
 TEST_F(MarkResolved, TakesTheNewCommitOfASubmodule)
 {
     auto inner = makeRepository("inner");
