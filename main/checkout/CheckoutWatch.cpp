@@ -81,11 +81,6 @@ int setConflict(const Obstacle &obstacle)
     return GIT_ECONFLICT;
 }
 
-int codeFor(const Finding &finding)
-{
-    return finding ? setConflict(*finding) : 0;
-}
-
 } // namespace
 
 CheckoutWatch::CheckoutWatch(CheckoutKind kind, git_repository *repository,
@@ -274,7 +269,7 @@ int CheckoutWatch::hear(const CheckoutNotice &notice)
     if (kind_ == CheckoutKind::Revert)
     {
         const Finding found = clearAll(notice);
-        return codeFor(found ? found : noteHardLink(notice));
+        return answer(found ? found : noteHardLink(notice));
     }
     if (!copy_)
     {
@@ -291,7 +286,13 @@ int CheckoutWatch::hear(const CheckoutNotice &notice)
         }
     }
     const Finding found = judge(notice);
-    return codeFor(found ? found : noteHardLink(notice));
+    return answer(found ? found : noteHardLink(notice));
+}
+
+int CheckoutWatch::answer(const Finding &found)
+{
+    hasRefused_ = found.has_value();
+    return hasRefused_ ? setConflict(*found) : 0;
 }
 
 Finding CheckoutWatch::judge(const CheckoutNotice &notice)

@@ -70,6 +70,13 @@ class CheckoutWatch
     /// @throws LibGit2Exception
     void settleSubmodules() const;
 
+    /// Returns true if the watch has refused the checkout at one of its notifications, so that
+    /// libgit2 has written nothing.
+    bool hasRefused() const noexcept
+    {
+        return hasRefused_;
+    }
+
   private:
     static int pass(git_checkout_notify_t why, const char *path, const git_diff_file *baseline,
                     const git_diff_file *target, const git_diff_file *workdir,
@@ -77,8 +84,10 @@ class CheckoutWatch
     static void passProgress(const char *path, std::size_t completed, std::size_t total,
                              void *payload) noexcept;
     int hear(const CheckoutNotice &notice);
+    int answer(const Finding &found);
     Finding noteHardLink(const CheckoutNotice &notice);
     Finding judge(const CheckoutNotice &notice);
+    Finding judgeSwitch(WorkingCopy &copy, const TreeChange &change);
     void makeWay(const CheckoutNotice &notice);
     WorkingCopy &lookAtWorkingCopy();
     void noteUntracked(const CheckoutNotice &notice);
@@ -101,6 +110,7 @@ class CheckoutWatch
     /// The record's own value, while a switch keeps submodules.
     OwnedHandle<git_index> baseline_;
     bool hasHeard_ = false;
+    bool hasRefused_ = false;
     /// What libgit2 itself replaces, according to its last notification with something in that
     /// place.
     std::string replaced_;

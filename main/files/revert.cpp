@@ -142,7 +142,12 @@ void GitAdapter::revertFiles(const std::vector<upath> &files)
     git_checkout_options record = toGitCheckoutOptions(options, callbacks_->checkoutCallbacks());
     record.paths = getArray(pathspec);
     const CheckoutWatch watch(CheckoutKind::Revert, repository.get(), record);
-    check(git_checkout_index, repository.get(), nullptr, &record);
+    const GitResult<void> restored = call(git_checkout_index, repository.get(), nullptr, &record);
+    if (watch.hasRefused())
+    {
+        lock.discard();
+    }
+    check(restored);
     lock.publish();
 }
 

@@ -150,6 +150,11 @@ void IndexLock::publish()
     }
 }
 
+void IndexLock::discard() noexcept
+{
+    held_.reset();
+}
+
 void IndexLock::release()
 {
     publish();

@@ -40,6 +40,10 @@ class IndexLock
     /// Calls publish() and releases the lock.
     void release();
 
+    /// Releases the lock, and leaves the index as it was before what libgit2 wrote: for an
+    /// operation that refuses before it changes any file.
+    void discard() noexcept;
+
   private:
     class LockFile;
     class Held;
