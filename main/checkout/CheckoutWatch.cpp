@@ -26,24 +26,25 @@ namespace
 using ChangeRule = Finding (*)(WorkingCopy &, const TreeChange &);
 using NoticeRule = Finding (*)(WorkingCopy &, const CheckoutNotice &);
 
-constexpr std::array<ChangeRule, 12> switchRules{findBlockedWay,
-                                                 findSpecialFile,
-                                                 findIgnoredLink,
-                                                 findForeignInFolder,
-                                                 findMissingFolder,
-                                                 findSubmodule,
-                                                 findFileForSubmodule,
-                                                 findFolderOfOtherUse,
-                                                 findFolderForDeletedFile,
-                                                 findStagedBelowSubmodule,
-                                                 findMissingFileOfOtherKind,
-                                                 findUnwritableFolder};
+// A file that stays a file needs only the first array of each pair.
+constexpr std::array<ChangeRule, 2> switchRules{findBlockedWay, findSpecialFile};
+constexpr std::array<ChangeRule, 10> otherSwitchRules{findIgnoredLink,
+                                                      findForeignInFolder,
+                                                      findMissingFolder,
+                                                      findSubmodule,
+                                                      findFileForSubmodule,
+                                                      findFolderOfOtherUse,
+                                                      findFolderForDeletedFile,
+                                                      findStagedBelowSubmodule,
+                                                      findMissingFileOfOtherKind,
+                                                      findUnwritableFolder};
 constexpr std::array<ChangeRule, 3> stagedRules{findStagedSubmodule, findStagedDeletion,
                                                 findStagedContent};
-constexpr std::array<ChangeRule, 8> mergeRules{findBlockedWayOfMerge,    findUntracked,
-                                               findFileForSubmodule,     findSubmodule,
-                                               findFolderForDeletedFile, findSubmoduleAfterSibling,
-                                               findUntrackedOfHead,      findUnwritableFolder};
+constexpr std::array<ChangeRule, 3> mergeRules{findBlockedWayOfMerge, findUntracked,
+                                               findSubmoduleAfterSibling};
+constexpr std::array<ChangeRule, 5> otherMergeRules{findFileForSubmodule, findSubmodule,
+                                                    findFolderForDeletedFile, findUntrackedOfHead,
+                                                    findUnwritableFolder};
 constexpr std::array<NoticeRule, 2> switchNoticeRules{findUnseen, findMissingFile};
 constexpr std::array<NoticeRule, 7> mergeNoticeRules{
     findEdit,          findUnseen,           findUntrackedNoticed, findForeignInFolderNoticed,
@@ -121,15 +122,7 @@ void CheckoutWatch::lookBeforeSwitch(const git_object *target)
     visitTreeChanges(repository_, copy.head(), tree.get(),
                      [&](const TreeChange &change)
                      {
-                         found = ask(switchRules, copy, change);
-                         if (!found && !isForced_)
-                         {
-                             found = ask(stagedRules, copy, change);
-                         }
-                         if (!found && switched_.note(copy, change) && isForced_)
-                         {
-                             found = inTheWay(change.path, Standing::Folder);
-                         }
+                         found = judgeSwitch(copy, change);
                          return !found;
                      });
     if (found)
@@ -141,6 +134,25 @@ void CheckoutWatch::lookBeforeSwitch(const git_object *target)
         baseline_ = switched_.makeBaseline(copy);
         record_.baseline_index = baseline_.get();
     }
+}
+
+Finding CheckoutWatch::judgeSwitch(WorkingCopy &copy, const TreeChange &change)
+{
+    Finding found = ask(switchRules, copy, change);
+    const bool isOther = !staysFile(change);
+    if (!found && isOther)
+    {
+        found = ask(otherSwitchRules, copy, change);
+    }
+    if (!found && !isForced_)
+    {
+        found = ask(stagedRules, copy, change);
+    }
+    if (!found && isOther && switched_.note(copy, change) && isForced_)
+    {
+        found = inTheWay(change.path, Standing::Folder);
+    }
+    return found;
 }
 
 void CheckoutWatch::lookBeforeMerge(const git_oid *theirs)
@@ -163,16 +175,24 @@ void CheckoutWatch::lookBeforeMerge(const git_oid *theirs)
         visitTreeChanges(repository_, before.get(), after.get(),
                          [&](const TreeChange &change)
                          {
+                             const bool isOther = !staysFile(change);
                              found = ask(mergeRules, copy, change);
+                             if (!found && isOther)
+                             {
+                                 found = ask(otherMergeRules, copy, change);
+                             }
                              if (!found)
                              {
                                  found = findLockOfConflict(repository_, copy, change, after.get());
                              }
                              renamed.note(copy, change);
                              toFolders.note(copy, change);
-                             merged_.noteChange(copy, change);
-                             yielding = firstOf(yielding, findYielding(copy, change));
-                             mayBeRenamed = mayBeRenamed || isDeletedByBoth(copy, change);
+                             if (isOther)
+                             {
+                                 merged_.noteChange(copy, change);
+                                 yielding = firstOf(yielding, findYielding(copy, change));
+                                 mayBeRenamed = mayBeRenamed || isDeletedByBoth(copy, change);
+                             }
                              return !found;
                          });
         if (!found)

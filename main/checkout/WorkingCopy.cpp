@@ -1,8 +1,10 @@
 // SPDX-License-Identifier: MIT
 #include "main/checkout/WorkingCopy.hpp"
 
+#include <algorithm>
 #include <cerrno>
 #include <cstddef>
+#include <cstring>
 #include <filesystem>
 #include <memory>
 #include <utility>
@@ -36,6 +38,13 @@ std::string workdirOf(git_repository *repository)
     return workdir != nullptr ? workdir : "";
 }
 
+bool isDirectlyIn(const std::string &folder, const std::string &name)
+{
+    const std::size_t size = folder.size();
+    return name.size() > size && name[size] == '/' && name.compare(0, size, folder) == 0 &&
+           name.find('/', size + 1) == std::string::npos;
+}
+
 /// Returns 0, or why files of the folder cannot be created and removed.
 int accessError(const std::string &folder)
 {
@@ -46,7 +55,7 @@ int accessError(const std::string &folder)
 
 WorkingCopy::WorkingCopy(git_repository *repository)
     : repository_(repository), root_(workdirOf(repository)), index_(getRepositoryIndex(repository)),
-      hasIndex_(standingAt(git_index_path(index_.get())) != Standing::Nothing)
+      hasIndex_(standingAt(git_index_path(index_.get())) != Standing::Nothing), path_(root_)
 {
     const OwnedHandle<git_reference> head = lookupHead(repository);
     if (head != nullptr)
@@ -68,7 +77,7 @@ Standing WorkingCopy::at(const std::string &name)
 
 const std::string &WorkingCopy::pathOf(const std::string &name)
 {
-    path_.assign(root_).append(name);
+    path_.replace(root_.size(), std::string::npos, name);
     return path_;
 }
 
@@ -105,18 +114,19 @@ bool WorkingCopy::hasSiblingBeforeFolder(const std::string &folder) const
 
 const WorkingCopy::Way &WorkingCopy::wayTo(const std::string &name)
 {
+    // Names come in the order of folders.
+    if (wayToFolder_ != nullptr && isDirectlyIn(folder_, name))
+    {
+        return *wayToFolder_;
+    }
     const auto end = name.rfind('/');
     if (end == std::string::npos)
     {
         return wayToRoot_;
     }
-    // Names come in the order of folders.
-    if (wayToFolder_ == nullptr || name.compare(0, end, folder_) != 0)
-    {
-        folder_.assign(name, 0, end);
-        wayToFolder_ = nullptr;
-        wayToFolder_ = &findWay(name);
-    }
+    folder_.assign(name, 0, end);
+    wayToFolder_ = nullptr;
+    wayToFolder_ = &findWay(name);
     return *wayToFolder_;
 }
 
@@ -211,10 +221,41 @@ const git_index_entry *WorkingCopy::entryOf(const std::string &name)
 {
     if (asked_.empty() || asked_ != name)
     {
-        entry_ = git_index_get_bypath(index_.get(), name.c_str(), 0);
+        entry_ = findEntry(name.c_str());
         asked_ = name;
     }
     return entry_;
+}
+
+/// Searches from the last place on, in growing steps, because names come in the order of the index.
+/// libgit2 calculates a hash of each name. It is asked for what is not found, because it may treat
+/// upper and lower case as equal.
+const git_index_entry *WorkingCopy::findEntry(const char *name)
+{
+    git_index *const index = index_.get();
+    const auto isBefore = [index, name](std::size_t place)
+    { return std::strcmp(git_index_get_byindex(index, place)->path, name) < 0; };
+    const std::size_t count = git_index_entrycount(index);
+    const bool goesOn = place_ > 0 && place_ <= count && isBefore(place_ - 1);
+    std::size_t first = goesOn ? place_ : 0;
+    std::size_t last = first;
+    for (std::size_t step = 1; last < count && isBefore(last); step *= 2)
+    {
+        first = last + 1;
+        last = std::min(count, last + step);
+    }
+    while (first < last)
+    {
+        const std::size_t middle = first + (last - first) / 2;
+        const bool isAfter = !isBefore(middle);
+        (isAfter ? last : first) = isAfter ? middle : middle + 1;
+    }
+    const git_index_entry *const entry = git_index_get_byindex(index, first);
+    const bool isFound = entry != nullptr &&
+                         GIT_INDEX_ENTRY_STAGE(entry) == GIT_INDEX_STAGE_NORMAL &&
+                         std::strcmp(entry->path, name) == 0;
+    place_ = isFound ? first + 1 : first;
+    return isFound ? entry : git_index_get_bypath(index, name, GIT_INDEX_STAGE_NORMAL);
 }
 
 bool WorkingCopy::hasEntryBelow(const std::string &folder) const

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include <cstddef>
 #include <optional>
 #include <string>
 #include <unordered_map>
@@ -99,6 +100,7 @@ class WorkingCopy
   private:
     /// In a buffer that the next call uses again: this runs for each file of a checkout.
     const std::string &pathOf(const std::string &name);
+    const git_index_entry *findEntry(const char *name);
     git_object_t typeInHead(const std::string &name) const;
     const Way &findWay(const std::string &name);
     Way wayInto(const std::string &folder, const Way &above) const;
@@ -118,6 +120,9 @@ class WorkingCopy
     /// The name whose entry was asked for last; empty for none.
     std::string asked_;
     const git_index_entry *entry_ = nullptr;
+    /// Where the last search in the index ended.
+    std::size_t place_ = 0;
+    /// The root, and a name.
     std::string path_;
     /// The folder that was examined last, and what came out.
     std::optional<std::string> examined_;

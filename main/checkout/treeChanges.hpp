@@ -25,6 +25,18 @@ struct TreeChange
     const git_tree_entry *after;
 };
 
+/// Returns true if a file stays a file, as in most changes. Fewer rules apply to it.
+inline bool staysFile(const TreeChange &change)
+{
+    const auto isFile = [](const git_tree_entry *entry)
+    {
+        const git_filemode_t mode =
+            entry != nullptr ? git_tree_entry_filemode(entry) : GIT_FILEMODE_UNREADABLE;
+        return mode == GIT_FILEMODE_BLOB || mode == GIT_FILEMODE_BLOB_EXECUTABLE;
+    };
+    return isFile(change.before) && isFile(change.after);
+}
+
 /// Returns true if the index has the entry of one side.
 inline bool isOf(const git_index_entry &entry, const git_tree_entry *side)
 {
