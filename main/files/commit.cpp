@@ -126,14 +126,15 @@ void GitAdapter::refreshForCommit(git_repository *repository, git_index *index,
     const ChangedFiles changed(repository, index);
     HeldEntries held;
     // Before anything else is changed in memory: after a failure the index is read again.
-    stageChangedFiles(repository, index, changed, changed.files(), held);
+    const std::vector<std::string> removed =
+        stageChangedFiles(repository, index, changed, changed.files(), held);
     const CommitSubmodules submodules(repository, index, parents);
     submodules.resolve(index);
     if (expectedMerge_ != nullptr)
     {
         submodules.takeOut(index);
     }
-    refreshIndex(repository, index, changed, held);
+    refreshIndex(repository, index, changed, removed, held);
     // Without HEAD it is unknown which commit the user has checked out on purpose.
     const std::size_t ours = head != nullptr ? 1 : 0;
     if (expectedMerge_ != nullptr || parents.size() > ours)

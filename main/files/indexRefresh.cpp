@@ -7,6 +7,7 @@
 #include <ctime>
 #include <string>
 #include <tuple>
+#include <vector>
 
 #include <fcntl.h>
 #include <git2/errors.h>
@@ -119,7 +120,7 @@ void refuseUnreadableAmongDropped(git_repository *repository, git_index *index, 
 } // namespace
 
 void refreshIndex(git_repository *repository, git_index *index, const ChangedFiles &changed,
-                  HeldEntries &held)
+                  const std::vector<std::string> &removed, HeldEntries &held)
 {
     const std::size_t countBefore = git_index_entrycount(index);
     stageEmptiedFiles(repository, index, changed.files());
@@ -130,6 +131,13 @@ void refreshIndex(git_repository *repository, git_index *index, const ChangedFil
     {
         const OwnedHandle<git_index> before = openIndex(git_index_path(index));
         refuseUnreadableAmongDropped(repository, index, before.get());
+    }
+    // Some programs save a file by removing and creating it. If it exists again,
+    // git_index_update_all has passed over it, because it was not tracked any more.
+    const std::string workdir = git_repository_workdir(repository);
+    for (const std::string &path : removed)
+    {
+        refuseUnreadable(workdir, path);
     }
 }
 

@@ -1,6 +1,9 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include <string>
+#include <vector>
+
 #include <git2/types.h>
 
 #include "main/files/ChangedFiles.hpp"
@@ -13,11 +16,12 @@ namespace vclink::git
 /// files and removes deleted ones. Keeps entries of files that are not checked out, which
 /// git_index_update_all would remove, as it would those of unreadable files. git_index_update_all.
 /// @param changed what stageChangedFiles() was given; it is read again for what that left
+/// @param removed what stageChangedFiles() has removed
 /// @param held entries that need no comparison; they are given back
-/// @throws LibGit2Exception if the refresh fails or a file cannot be read; then the index must not
-/// be written
+/// @throws LibGit2Exception if the refresh fails, a file cannot be read, or a removed one exists
+/// again; then the index must not be written
 void refreshIndex(git_repository *repository, git_index *index, const ChangedFiles &changed,
-                  HeldEntries &held);
+                  const std::vector<std::string> &removed, HeldEntries &held);
 
 /// Marks in the index, in memory, the files that were saved since the refresh in the second in
 /// which the index was written. git, which ignores fractions, would treat them as unchanged. For an

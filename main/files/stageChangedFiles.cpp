@@ -82,6 +82,10 @@ class Staging
     {
         return unmodified_;
     }
+    const std::vector<std::string> &removed() const noexcept
+    {
+        return removed_;
+    }
 
   private:
     GitResult<void> stage(const git_diff_delta &delta)
@@ -98,6 +102,7 @@ class Staging
         }
         else if (delta.status == GIT_DELTA_DELETED && isGone(workdir_ + path))
         {
+            removed_.emplace_back(path);
             return call(git_index_remove_bypath, index_, path);
         }
         return boost::outcome_v2::success();
@@ -106,6 +111,7 @@ class Staging
     std::string workdir_;
     git_index *index_;
     std::vector<std::string> unmodified_;
+    std::vector<std::string> removed_;
 };
 
 /// Whether the comparison has a file with other attributes, which decide about files that are
@@ -138,8 +144,9 @@ std::vector<std::string> pathsOf(const std::vector<ChangedFile> &files)
     return paths;
 }
 
-GitResult<void> stageByPath(git_repository *repository, git_index *index,
-                            std::vector<std::string> paths, HeldEntries &held)
+/// Returns the paths of the removed files.
+GitResult<std::vector<std::string>> stageByPath(git_repository *repository, git_index *index,
+                                                std::vector<std::string> paths, HeldEntries &held)
 {
     const PathspecArray pathspec(std::move(paths));
     const GitResult<OwnedDiff> diff = compare(repository, index, pathspec);
@@ -150,35 +157,40 @@ GitResult<void> stageByPath(git_repository *repository, git_index *index,
     Staging staging(repository, index);
     if (!hasOtherAttributes(diff.value().get()))
     {
-        GitResult<void> staged = staging.stageAll(diff.value().get());
+        const GitResult<void> staged = staging.stageAll(diff.value().get());
         if (staged.has_error())
         {
-            return staged;
+            return staged.error();
         }
     }
     for (const std::string &path : staging.unmodified())
     {
         held.hold(index, path);
     }
-    return boost::outcome_v2::success();
+    return staging.removed();
 }
 
 } // namespace
 
-void stageChangedFiles(git_repository *repository, git_index *index, const ChangedFiles &changed,
-                       const std::vector<ChangedFile> &files, HeldEntries &held)
+std::vector<std::string> stageChangedFiles(git_repository *repository, git_index *index,
+                                           const ChangedFiles &changed,
+                                           const std::vector<ChangedFile> &files, HeldEntries &held)
 {
     std::vector<std::string> paths = pathsOf(files);
     // An index that ignores case has an order of its own, and finds entries by other names.
     if (paths.empty() || changed.dependOnOrder() || hasFilesBelowFiles(index) ||
         (git_index_caps(index) & GIT_INDEX_CAPABILITY_IGNORE_CASE) != 0)
     {
-        return;
+        return {};
     }
-    if (stageByPath(repository, index, std::move(paths), held).has_error())
+    GitResult<std::vector<std::string>> removed =
+        stageByPath(repository, index, std::move(paths), held);
+    if (removed.has_error())
     {
         check(git_index_read, index, int{true});
+        return {};
     }
+    return std::move(removed).value();
 }
 
 } // namespace vclink::git

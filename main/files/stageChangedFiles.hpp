@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include <string>
 #include <vector>
 
 #include <git2/types.h>
@@ -20,8 +21,11 @@ namespace vclink::git
 /// If a path fails, the index is read again. The call that follows reports the failure then.
 /// @param files those of `changed` that are to be staged
 /// @param held gets files that look changed and are not, so that their content is not read again
+/// @return the paths of the removed files; each may exist again since
 /// @throws LibGit2Exception if the index cannot be read again
-void stageChangedFiles(git_repository *repository, git_index *index, const ChangedFiles &changed,
-                       const std::vector<ChangedFile> &files, HeldEntries &held);
+std::vector<std::string> stageChangedFiles(git_repository *repository, git_index *index,
+                                           const ChangedFiles &changed,
+                                           const std::vector<ChangedFile> &files,
+                                           HeldEntries &held);
 
 } // namespace vclink::git

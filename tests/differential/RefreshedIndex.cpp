@@ -213,9 +213,9 @@ std::string refreshByLibrary(const GitRepository &repository)
     {
         const git::ChangedFiles changed(opened.handle.get(), opened.index.get());
         git::HeldEntries held;
-        git::stageChangedFiles(opened.handle.get(), opened.index.get(), changed, changed.files(),
-                               held);
-        git::refreshIndex(opened.handle.get(), opened.index.get(), changed, held);
+        const auto removed = git::stageChangedFiles(opened.handle.get(), opened.index.get(),
+                                                    changed, changed.files(), held);
+        git::refreshIndex(opened.handle.get(), opened.index.get(), changed, removed, held);
         return textOf(opened.index.get());
     }
     catch (const git::LibGit2Exception &exception)

@@ -223,6 +223,32 @@ TEST_F(RefreshOfACommit, TakesWhatIsSavedAfterAPathIsStaged)
     EXPECT_THAT(status(), IsEmpty());
 }
 
+/// A program that removes the file and creates it to save it: in between, and only then, the commit
+/// finds it gone.
+TEST_F(RefreshOfACommit, RefusesADeletionOfAFileThatComesBack)
+{
+    for (const auto *name : {"other", "sub/inside"})
+    {
+        const std::string content = repository_.read(name);
+        repository_.remove(name);
+        startNoting();
+        calls_->on<git_index_update_all>(
+            [&](git_index *, const git_strarray *, git_index_matched_path_cb, void *)
+            { repository_.write(name, content); });
+        const auto head = idOf("HEAD");
+        const auto index = indexOf(repository_);
+        EXPECT_EQ(failureOf([this] { commitOnce(); }),
+                  (Failure{GIT_ERROR, GIT_ERROR_OS,
+                           std::string("could not read '") + name +
+                               "', which is tracked: Input/output error"}));
+        EXPECT_THAT(calls_->steps(), Contains("git_index_remove_bypath"));
+        EXPECT_THAT(calls_->openHandles(), IsEmpty());
+        calls_.reset();
+        EXPECT_EQ(idOf("HEAD"), head);
+        EXPECT_EQ(indexOf(repository_), index);
+    }
+}
+
 /// Three stages become one entry, and none is gone.
 TEST_F(RefreshOfACommit, PutsNothingBackWhenAConflictEnds)
 {
