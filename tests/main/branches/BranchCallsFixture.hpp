@@ -70,12 +70,13 @@ class BranchCallsFixture : public MergeFixture
                 {"git_object_peel", "git_tree_lookup", "git_tree_entry_bypath", "git_tree_free",
                  "git_object_free"}});
     const Calls lookingUpATree_{"git_commit_lookup", "git_commit_tree", "git_commit_free"};
-    const Calls lookBeforeAMerge_ = joined({openingTheLook_,
-                                            {"git_reference_name_to_id"},
-                                            lookingUpATree_,
-                                            {"git_merge_bases"},
-                                            lookingUpATree_,
-                                            {"git_tree_free", "git_tree_free"}});
+    const Calls lookBeforeAMerge_ =
+        joined({openingTheLook_,
+                {"git_reference_name_to_id"},
+                lookingUpATree_,
+                {"git_merge_bases"},
+                lookingUpATree_,
+                {"git_index_find_prefix", "git_tree_free", "git_tree_free"}});
     const Calls endOfTheLook_{"git_tree_free", "git_index_free"};
 
     const Failure injected_{GIT_ERROR, GIT_ERROR_OS, injectedText};
