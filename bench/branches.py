@@ -13,7 +13,7 @@ ROUNDS = 7
 DRIVER_ROUNDS = 21  # many, because a verdict depends on the times
 FILES = 4_000
 CHANGED = 1_000
-IN_COMMON = 100
+IN_COMMON = 10  # one in so many is changed on both sides
 BRANCHES = 10_000
 DRIVEN = 100
 PACKED = 2_000
@@ -47,11 +47,13 @@ def export_stream(base, ours, theirs, attributes):
 class Operation:
     """One operation in a working copy of its own, which is restored before each run."""
 
-    def __init__(self, name, title, limit, driver=None):
+    def __init__(self, name, title, limit=None, driver=None, files=FILES, changed=CHANGED):
         self.name = name
         self.title = title
         self.limit = limit
         self.driver = driver
+        self._tracked = files
+        self._changed = changed
         self._branch = "theirs"
         # The number of branches that are made and packed, and how many of them the programs visit.
         self._packed = {"branches": BRANCHES, "delete": PACKED, "revisions": PACKED}.get(name)
@@ -90,10 +92,11 @@ class Operation:
             numbers = range(DRIVEN)
             return ({n: text(n) for n in numbers}, {n: text(n, first="ours") for n in numbers},
                     {n: text(n, last="theirs") for n in numbers})
-        base = {n: text(n) for n in range(FILES)}
-        theirs = {n: text(n, last="theirs") for n in range(CHANGED)}
-        first_of_ours = CHANGED - IN_COMMON
-        ours = {n: text(n, first="ours") for n in range(first_of_ours, first_of_ours + CHANGED)}
+        base = {n: text(n) for n in range(self._tracked)}
+        theirs = {n: text(n, last="theirs") for n in range(self._changed)}
+        first_of_ours = self._changed - self._changed // IN_COMMON
+        ours = {n: text(n, first="ours")
+                for n in range(first_of_ours, first_of_ours + self._changed)}
         return base, {} if self.name == "switch" else ours, theirs
 
     def _write(self, files):

@@ -32,6 +32,18 @@ static void add(const char *root, git_strarray names)
     git_repository_free(repository);
 }
 
+static void removeFiles(const char *root, git_strarray names)
+{
+    walk(root, names);
+    git_repository *const repository = openRepository(root);
+    git_index *index = NULL;
+    check(git_repository_index(&index, repository), "git_repository_index");
+    check(git_index_remove_all(index, &names, acceptAll, NULL), "git_index_remove_all");
+    check(git_index_write(index), "git_index_write");
+    git_index_free(index);
+    git_repository_free(repository);
+}
+
 static void commit(const char *root)
 {
     git_repository *const repository = openRepository(root);
@@ -43,6 +55,19 @@ static void commit(const char *root)
     const git_commit *parents[] = {head};
     commitIndex(repository, 1, parents);
     git_commit_free(head);
+    git_repository_free(repository);
+}
+
+/// Hashes and stores the listed files.
+static void store(const char *root, git_strarray names)
+{
+    git_repository *const repository = openRepository(root);
+    for (size_t i = 0; i < names.count; ++i)
+    {
+        git_oid id;
+        check(git_blob_create_from_workdir(&id, repository, names.strings[i]),
+              "git_blob_create_from_workdir");
+    }
     git_repository_free(repository);
 }
 
@@ -72,9 +97,17 @@ static void measure(const char *operation, const char *root, const char *listFil
     {
         add(root, names);
     }
+    else if (strcmp(operation, "remove") == 0)
+    {
+        removeFiles(root, names);
+    }
     else if (strcmp(operation, "revert") == 0)
     {
         revert(root, names);
+    }
+    else if (strcmp(operation, "store") == 0)
+    {
+        store(root, names);
     }
     else
     {
@@ -92,6 +125,11 @@ static void measureChild(const char *operation, const char *root, const char *li
     {
         measureShell("exec git -C \"$BENCH_ROOT\" add --pathspec-from-file=\"$BENCH_LIST\"");
     }
+    else if (strcmp(operation, "remove") == 0)
+    {
+        measureShell("exec git -C \"$BENCH_ROOT\" rm --quiet --cached "
+                     "--pathspec-from-file=\"$BENCH_LIST\"");
+    }
     else if (strcmp(operation, "revert") == 0)
     {
         measureShell("exec git -C \"$BENCH_ROOT\" restore --source=HEAD --staged --worktree "
@@ -105,6 +143,6 @@ static void measureChild(const char *operation, const char *root, const char *li
 
 int main(int argc, char **argv)
 {
-    return runFloor(argc, argv, "change_floor [child] add|commit|revert ROOT LIST", measure,
-                    measureChild);
+    return runFloor(argc, argv, "change_floor [child] add|remove|commit|revert|store ROOT LIST",
+                    measure, measureChild);
 }

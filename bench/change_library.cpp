@@ -21,6 +21,14 @@ void change(vclink::CMAdapter &adapter, const std::string &operation,
     {
         adapter.addFiles(files);
     }
+    else if (operation == "remove")
+    {
+        adapter.removeFiles(files);
+    }
+    else if (operation == "resolve")
+    {
+        adapter.markResolved(files.front());
+    }
     else if (operation == "revert")
     {
         adapter.revertFiles(files);
@@ -47,7 +55,7 @@ int main(int argc, char **argv)
 {
     if (argc != 4)
     {
-        std::fputs("usage: change_library add|commit|revert ROOT LIST\n", stderr);
+        std::fputs("usage: change_library add|remove|resolve|commit|revert ROOT LIST\n", stderr);
         return 2;
     }
     try

@@ -30,7 +30,8 @@ class Change:
         working_copies.make_working_copy(self._root, self._tracked, env)
         with open(self.arguments[2], "w", encoding="ascii") as file:
             file.writelines(f"{name}\n" for name in self._names())
-        self._edit()
+        if self.operation != "remove":
+            self._edit()
         if self.operation == "revert":
             # Half of the reverted changes are staged.
             staged = "".join(f"{name}\n" for name in self._names()[::2])
@@ -64,13 +65,17 @@ class Change:
 
 
 class ChangeBench:
-    def __init__(self, programs, scratch):
+    def __init__(self, programs, scratch, part=1):
+        """:param part: one in so many files"""
         self._programs = programs
         self._scratch = scratch
         self._changes = [
-            Change("add", "1,000 files added to 1,000", 1_000, 1_000),
-            Change("commit", "commit of 1,000 changes in 50,000 files", 50_000, 1_000),
-            Change("revert", "1,000 of 2,000 files reverted", 2_000, 1_000)]
+            Change("add", f"{1_000 // part:,} files added to {1_000 // part:,}", 1_000 // part,
+                   1_000 // part),
+            Change("commit", f"commit of {1_000 // part:,} changes in {50_000 // part:,} files",
+                   50_000 // part, 1_000 // part),
+            Change("revert", f"{1_000 // part:,} of {2_000 // part:,} files reverted",
+                   2_000 // part, 1_000 // part)]
 
     def make_working_copies(self, env):
         folder = os.path.join(self._scratch, "changes")

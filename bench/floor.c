@@ -40,6 +40,15 @@ static void measureChild(const char *root)
     measureShell("exec git -C \"$BENCH_ROOT\" status --porcelain -uall");
 }
 
+static void measureChildOfFiles(const char *root, const char *list)
+{
+    setenv("BENCH_ROOT", root, 1);
+    setenv("BENCH_LIST", list, 1);
+    setenv("GIT_OPTIONAL_LOCKS", "0", 1);
+    measureShell("exec xargs --arg-file=\"$BENCH_LIST\" git -C \"$BENCH_ROOT\" status "
+                 "--porcelain -uall --");
+}
+
 int main(int argc, char **argv)
 {
     git_libgit2_init();
@@ -59,9 +68,14 @@ int main(int argc, char **argv)
     {
         measureChild(argv[2]);
     }
+    else if (argc == 4 && strcmp(argv[1], "child") == 0)
+    {
+        measureChildOfFiles(argv[2], argv[3]);
+    }
     else
     {
-        fputs("usage: floor folder ROOT | files ROOT LIST | probe FOLDER | child ROOT\n", stderr);
+        fputs("usage: floor folder ROOT | files ROOT LIST | probe FOLDER | child ROOT [LIST]\n",
+              stderr);
         return 2;
     }
     git_libgit2_shutdown();

@@ -4,6 +4,7 @@
 
 import argparse
 import concurrent.futures
+import contextlib
 import os
 import platform
 import subprocess
@@ -12,6 +13,7 @@ import sys
 import working_copies
 from branches import BranchBench
 from changes import ChangeBench
+from commits import CommitBench
 from programs import COUNTS, Programs, Ratios
 from remotes import RemoteBench
 from report import Table, write_into
@@ -23,6 +25,7 @@ LIST_ROUNDS = 5
 # files, and many minutes for several counts.
 MOST_COMPARISONS = 10_000_000
 MOST_COMPARISONS_COUNTED_OFTEN = 1_000_000
+QUICK_PART = 4  # one in so many files
 
 FOLDER_RATIO = 1.10
 FOLDER_ALLOCATIONS = 2
@@ -40,11 +43,18 @@ def slope(values):
 
 
 class Bench:
-    def __init__(self, build, scratch, sizes):
-        self._programs = Programs(build, scratch)
-        self._changes = ChangeBench(self._programs, scratch)
-        self._branches = BranchBench(self._programs, scratch)
-        self._remotes = RemoteBench(self._programs, scratch)
+    def __init__(self, build, scratch, sizes, is_quick=False):
+        part = QUICK_PART if is_quick else 1
+        self._programs = Programs(build, scratch, is_quick)
+        self._changes = ChangeBench(self._programs, scratch, part)
+        self._commits = CommitBench(self._programs, scratch, part)
+        self._others = [BranchBench(self._programs, scratch)]
+        # Enters and leaves what the remotes need.
+        self._server = contextlib.nullcontext
+        if not is_quick:
+            self._others.append(RemoteBench(self._programs, scratch))
+            self._server = lambda: self._others[1].serve(self._env)
+        self._most_comparisons = MOST_COMPARISONS // (10 if is_quick else 1)
         self._sizes = sizes
         self._scratch = scratch
         # Short names, because the root is in every key of the result.
@@ -55,7 +65,7 @@ class Bench:
         home = os.path.join(self._scratch, "home")
         os.mkdir(home)
         self._env = working_copies.environment(home)
-        return self._remotes.serve(self._env)
+        return self._server()
 
     def make_working_copies(self):
         env = self._env
@@ -64,15 +74,16 @@ class Bench:
             for count in LISTS:
                 working_copies.write_list(self._list(size, count), count, size)
         self._changes.make_working_copies(env)
-        self._branches.make_working_copies(env)
-        self._remotes.make_working_copies(env)
+        self._commits.make_working_copies(env)
+        for other in self._others:
+            other.make_working_copies(env)
 
     def _list(self, size, count):
         return f"{self._roots[size]}.{count}"
 
     def _lists(self):
         return [(size, count) for size in self._sizes for count in LISTS
-                if size * count <= MOST_COMPARISONS]
+                if size * count <= self._most_comparisons]
 
     def count(self):
         """Counts instructions and allocations. Several runs at once are possible, because neither
@@ -81,8 +92,8 @@ class Bench:
         some = self._roots[self._sizes[0]]
         tasks = {
             **self._changes.tasks(),
-            **self._branches.tasks(),
-            **self._remotes.tasks(),
+            **self._commits.tasks(),
+            **{key: task for other in self._others for key, task in other.tasks().items()},
             ("less", "instructions"): lambda: programs.instructions(
                 "library", "less", some, self._list(self._sizes[0], 1_000)),
             ("less", "allocations"): lambda: programs.allocations(
@@ -124,13 +135,14 @@ class Bench:
             self._rounds[size, count] = self._programs.clock(
                 [("floor", *arguments), ("library", *arguments)], LIST_ROUNDS)
         self._changes.clock()
-        self._branches.clock()
-        self._remotes.clock()
+        self._commits.clock()
+        for other in self._others:
+            other.clock()
 
     def tables(self):
         return [self._folder_table(), self._files_table(),
-                self._changes.table(self._counted), self._branches.table(self._counted),
-                self._remotes.table(self._counted), self._small_table()]
+                self._changes.table(self._counted), *self._commits.tables(self._counted),
+                *(other.table(self._counted) for other in self._others), self._small_table()]
 
     def _per_file(self, program):
         return {size: self._counted["folder", program, size] / size for size in self._sizes}
@@ -223,7 +235,7 @@ def parse():
     parser = argparse.ArgumentParser(description=__doc__)
     parser.add_argument("--build", required=True, help="the build folder")
     parser.add_argument("--scratch", required=True, help="an empty folder with a short name")
-    parser.add_argument("--quick", action="store_true", help="leaves out the largest working copy")
+    parser.add_argument("--quick", action="store_true", help="smaller working copies, no remotes")
     parser.add_argument("--page", help="file to write the tables into")
     return parser.parse_args()
 
@@ -231,7 +243,7 @@ def parse():
 def main():
     options = parse()
     sizes = list(SIZES)[:2] if options.quick else list(SIZES)
-    bench = Bench(options.build, options.scratch, sizes)
+    bench = Bench(options.build, options.scratch, sizes, options.quick)
     with bench.serving():
         for what, step in (("making working copies", bench.make_working_copies),
                            ("counting instructions and allocations", bench.count),

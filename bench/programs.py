@@ -19,13 +19,15 @@ class Programs:
     """The programs of one build, in one environment. Each run returns the results of its measured
     region, by name."""
 
-    def __init__(self, build, scratch):
+    def __init__(self, build, scratch, is_quick=False):
+        """:param is_quick: count once and time twice, whatever is asked for"""
         self._build = os.path.join(build, "bench")
         stage = os.path.join(os.path.abspath(build), "stage")
         self.library = glob.glob(os.path.join(stage, "lib", "**", "libvclink_git.so"),
                                  recursive=True)[0]
         self.tool = os.path.join(stage, "bin", "lnxhost", "vkAutoMerge.sh")
         self._scratch = scratch
+        self._is_quick = is_quick
         self._env = working_copies.environment(os.path.join(scratch, "home"))
 
     def run(self, program, *arguments, wrapper=(), env=None):
@@ -40,7 +42,7 @@ class Programs:
         """Returns the instructions of the region of each command: {name: median}. Calls `before` before
         each run."""
         counted = {name: [] for name in commands}
-        for number in range(counts):
+        for number in range(1 if self._is_quick else counts):
             for name, command in commands.items():
                 before()
                 counted[name].append(
@@ -65,18 +67,19 @@ class Programs:
         library = os.path.join(self._build, "libvclink_bench_allocations.so")
         return self.run(program, *arguments, env={**self._env, "LD_PRELOAD": library})
 
-    def clock(self, commands, rounds, before=lambda: None, added=None):
+    def clock(self, commands, rounds, before=lambda: None, added=None, clock="nanoseconds"):
         """Runs all commands once in each round, in every second round backwards, after one round for
         the system's caches. Calls `before` before each command, and adds `added` to the environment.
-        Returns for each round the times in the order of the commands."""
+        Returns for each round the times in the order of the commands, by this clock:
+        "processor_nanoseconds" hardly depends on what else runs."""
         env = {**self._env, **(added or {})}
         times = []
-        for number in range(rounds + 1):
+        for number in range((2 if self._is_quick else rounds) + 1):
             order = list(enumerate(commands))
             taken = {}
             for place, command in (reversed(order) if number % 2 else order):
                 before()
-                taken[place] = self.run(*command, env=env)["nanoseconds"]
+                taken[place] = self.run(*command, env=env)[clock]
             times.append([taken[place] for place in range(len(commands))])
         return times[1:]
 

@@ -6,6 +6,7 @@
 #include <stdio.h>
 #include <stdlib.h>
 #include <string.h>
+#include <sys/resource.h>
 #include <time.h>
 
 #include <valgrind/callgrind.h>
@@ -15,6 +16,7 @@
 static struct AllocationCounts *counts;
 static struct timespec started;
 static struct timespec ended;
+static long long processorTime;
 static void *displacement;
 
 /// Moves what the heap gives out within the region by so many bytes: see COUNTS in programs.py.
@@ -22,6 +24,22 @@ static void displaceHeap(void)
 {
     const char *const bytes = getenv("VCLINK_BENCH_DISPLACEMENT");
     displacement = bytes == NULL ? NULL : malloc(strtoul(bytes, NULL, 10));
+}
+
+static long long nanosecondsOf(const struct timeval *time)
+{
+    return (long long)time->tv_sec * 1000000000 + (long long)time->tv_usec * 1000;
+}
+
+/// What this process and the children that it has waited for have used, in nanoseconds.
+static long long readProcessorTime(void)
+{
+    struct rusage own;
+    struct rusage children;
+    getrusage(RUSAGE_SELF, &own);
+    getrusage(RUSAGE_CHILDREN, &children);
+    return nanosecondsOf(&own.ru_utime) + nanosecondsOf(&own.ru_stime) +
+           nanosecondsOf(&children.ru_utime) + nanosecondsOf(&children.ru_stime);
 }
 
 void beginRegion(void)
@@ -32,6 +50,7 @@ void beginRegion(void)
     {
         counts->enabled = 1;
     }
+    processorTime = readProcessorTime();
     clock_gettime(CLOCK_MONOTONIC, &started);
     CALLGRIND_START_INSTRUMENTATION;
 }
@@ -40,6 +59,7 @@ void endRegion(void)
 {
     CALLGRIND_STOP_INSTRUMENTATION;
     clock_gettime(CLOCK_MONOTONIC, &ended);
+    processorTime = readProcessorTime() - processorTime;
     if (counts != NULL)
     {
         counts->enabled = 0;
@@ -72,6 +92,7 @@ void printRegion(size_t entries)
     printf("entries %zu\n", entries);
     printf("nanoseconds %lld\n", (long long)(ended.tv_sec - started.tv_sec) * 1000000000 +
                                      (ended.tv_nsec - started.tv_nsec));
+    printf("processor_nanoseconds %lld\n", processorTime);
     printf("peak_kib %ld\n", readPeakKib());
     if (counts != NULL)
     {
