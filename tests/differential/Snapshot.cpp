@@ -171,8 +171,8 @@ void compare(const char *what, const Snapshot::Entries &left, const Snapshot::En
     names.insert(right.begin(), right.end());
     for (const auto &[name, ignored] : names)
     {
-        const auto valueIn = [&name = name](const Snapshot::Entries &entries)
-        { return entries.count(name) == 0 ? std::string("nothing") : entries.at(name); };
+        const auto valueIn = [&path = name](const Snapshot::Entries &entries)
+        { return entries.count(path) == 0 ? std::string("nothing") : entries.at(path); };
         if (valueIn(left) != valueIn(right))
             text += std::string("  ") + what + ' ' + name + ": " + valueIn(left) + " -> " +
                     valueIn(right) + '\n';

@@ -236,7 +236,7 @@ TEST_F(RelativeToRoot, RaisesForWhatCannotBeResolvedOnALoopWithTheCodeOfItsDefin
         {"root", "root/loop/file"},  {"root/loop", "root/file"}};
     for (const auto &[root, path] : rows)
     {
-        const auto code = codeOf([&, &root = root, &path = path] { relative(root, path); });
+        const auto code = codeOf([&, &from = root, &to = path] { relative(from, to); });
         EXPECT_TRUE(code) << path.substr(0, 100);
     }
     EXPECT_EQ(codeOf([&] { relative("root", "root/loop"); }),
