@@ -152,7 +152,7 @@ void Window::makeLanguages()
         auto *const action = menu->addAction(name);
         action->setObjectName(QString::fromLatin1(code));
         connect(action, &QAction::triggered, this,
-                [code = QString::fromLatin1(code)] { setLanguage(code); });
+                [language = QString::fromLatin1(code)] { setLanguage(language); });
     }
 }
 
