@@ -17,6 +17,7 @@
 #include "error/logging/logger.hpp"
 #include "main/checkout/CheckoutWatch.hpp"
 #include "main/merge/BranchMerger.hpp"
+#include "main/mergeState/unfinishedOperation.hpp"
 #include "options/gitRecords.hpp"
 #include "util/lock/IndexLock.hpp"
 #include "util/lock/PackedReferences.hpp"
@@ -145,6 +146,7 @@ void BasicBranchManager::switchBranch(const BranchName &name)
     const OwnedHandle<git_reference> branch = lookupLocalBranch(repository.get(), shortName);
     const OwnedHandle<git_object> target = revparseObject(repository.get(), name).value();
     refuseCheckedOutElsewhere(branch.get());
+    refuseSwitchInUnfinishedOperation(repository.get());
     const CheckoutOptions options = optionsFactory_->makeCheckoutOptions();
     git_checkout_options record = toGitCheckoutOptions(options, callbacks_->checkoutCallbacks());
     CheckoutWatch watch(CheckoutKind::Switch, repository.get(), record);
@@ -193,6 +195,10 @@ void BasicBranchManager::deleteBranch(const BranchName &name)
         }
         const OwnedHandle<git_reference> branch = lookupLocalBranch(repository.get(), shortName);
         id = targetOf(branch.get());
+        const char *const reference = git_reference_name(branch.get());
+        refuseDeletionInUnfinishedOperation(repository.get(), reference);
+        // libgit2 removes the branch's configuration first, and does not restore it.
+        awaitUnlocked(repository.get(), reference);
         return call(git_branch_delete, branch.get());
     };
     PackedReferences packed(repository.get());

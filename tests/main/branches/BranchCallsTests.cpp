@@ -46,7 +46,9 @@ TEST_F(CallsOnBranches, AreTheseInOrder)
          {"git_reference_dwim", "git_commit_lookup", "git_reference_free", "git_branch_create",
           "git_reference_free", "git_commit_free", "git_repository_free"}},
         {[this] { branches().deleteBranch("new"); },
-         joined({{"git_branch_lookup", "git_branch_delete"}, end})},
+         joined({{"git_branch_lookup", "git_transaction_new", "git_transaction_lock_ref",
+                  "git_transaction_free", "git_branch_delete"},
+                 end})},
         {[this] { branches().getCurrentBranch(); },
          joined({{"git_repository_head", "git_branch_name"}, end})}};
     for (const auto &[operation, expected] : operations)
@@ -105,7 +107,7 @@ TEST_F(CallsOnBranches, OfASwitchAreTheseInOrderWithTheRecordOfASafeCheckout)
         calls.steps(),
         joined({{"git_repository_open_ext", "git_index_open", "git_repository_set_index",
                  "git_index_set_caps", "git_index_free", "git_branch_lookup", "git_revparse_single",
-                 "git_branch_is_checked_out", "git_checkout_options_init"},
+                 "git_branch_is_checked_out", "git_repository_state", "git_checkout_options_init"},
                 lookBeforeASwitch_,
                 {"git_transaction_new", "git_transaction_lock_ref", "git_transaction_free",
                  "git_checkout_tree", "git_repository_set_head"},
@@ -222,9 +224,11 @@ TEST_F(CallsOfAMerge, OfACleanMergeAreTheseInOrder)
                  "git_index_open", "git_repository_set_index", "git_index_set_caps",
                  "git_index_free", "git_repository_state"},
                 lookBeforeAMerge_,
-                {"git_reference_name_to_id", "git_oid_fmt", "git_oid_fmt", "git_merge",
-                 "git_oid_fmt", "git_repository_index", "git_index_has_conflicts",
-                 "git_reference_dwim", "git_reference_free", "git_repository_open_ext"}});
+                {"git_repository_head", "git_transaction_new", "git_transaction_lock_ref",
+                 "git_transaction_free", "git_reference_free", "git_reference_name_to_id",
+                 "git_oid_fmt", "git_oid_fmt", "git_merge", "git_oid_fmt", "git_repository_index",
+                 "git_index_has_conflicts", "git_reference_dwim", "git_reference_free",
+                 "git_repository_open_ext"}});
     ASSERT_GE(calls.steps().size(), expected.size());
     const auto size = static_cast<std::ptrdiff_t>(expected.size());
     const Calls first(calls.steps().begin(), calls.steps().begin() + size);

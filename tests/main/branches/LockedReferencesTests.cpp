@@ -44,6 +44,8 @@ const std::vector<ReferenceChange> &referenceChanges()
          [](auto &, auto &branches) { branches.switchBranch("topic"); }},
         {"fastForward", "refs/heads/main.lock",
          [](auto &, auto &branches) { branches.merge("topic"); }},
+        {"threeWayMerge", "refs/heads/main.lock",
+         [](auto &, auto &branches) { branches.merge("apart"); }},
         {"commit", "refs/heads/main.lock",
          [](auto &adapter, auto &) { adapter.commit(upath(), u"message"); }},
         {"createBranch", "refs/heads/new.lock",
@@ -62,11 +64,15 @@ class LockedReference : public MergeFixture, public testing::WithParamInterface<
   protected:
     LockedReference()
     {
+        makeBranch("apart", writing("apart", "x"));
+        repository_.write("later", "x");
+        repository_.commitAll("later");
         makeAhead();
         repository_.git({"branch", "packed"});
         repository_.git({"pack-refs", "--all"});
         repository_.git({"branch", "loose"});
         repository_.git({"config", "branch.packed.description", "kept"});
+        repository_.git({"config", "branch.loose.description", "kept"});
     }
 
     void setTimeout(const std::string &value) const
@@ -137,6 +143,7 @@ TEST_P(LockedReference, FailsOnceTheTimeIsOver)
     repository_.write(lock(), "of another process");
     const std::string references = repository_.git({"for-each-ref"});
     const std::string head = repository_.read(".git/HEAD");
+    const std::string configuration = repository_.read(".git/config");
     const auto files = workingTreeOf(repository_);
     const auto begin = Steady::now();
     EXPECT_EQ(codeOf(), GIT_ELOCKED);
@@ -144,6 +151,7 @@ TEST_P(LockedReference, FailsOnceTheTimeIsOver)
     EXPECT_EQ(repository_.read(lock()), "of another process");
     EXPECT_EQ(repository_.git({"for-each-ref"}), references);
     EXPECT_EQ(repository_.read(".git/HEAD"), head);
+    EXPECT_EQ(repository_.read(".git/config"), configuration);
     EXPECT_EQ(workingTreeOf(repository_), files);
     EXPECT_EQ(repository_.git({"status", "--porcelain"}), "");
     EXPECT_FALSE(fs::exists(repository_ / ".git/index.lock"));

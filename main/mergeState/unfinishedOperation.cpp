@@ -1,0 +1,95 @@
+// SPDX-License-Identifier: MIT
+#include "main/mergeState/unfinishedOperation.hpp"
+
+#include <array>
+#include <fstream>
+#include <string>
+
+#include <git2/errors.h>
+#include <git2/repository.h>
+
+#include "error/errorUtil/GitResult.hpp"
+#include "error/errorUtil/raiseGitError.hpp"
+#include "util/repository/repository.hpp"
+
+namespace vclink::git
+{
+namespace
+{
+
+/// Returns null if a switch does no harm.
+const char *describe(int state)
+{
+    switch (state)
+    {
+    case GIT_REPOSITORY_STATE_NONE:
+    case GIT_REPOSITORY_STATE_BISECT:
+        return nullptr;
+    case GIT_REPOSITORY_STATE_MERGE:
+        return "a merge";
+    case GIT_REPOSITORY_STATE_REVERT:
+    case GIT_REPOSITORY_STATE_REVERT_SEQUENCE:
+        return "a revert";
+    case GIT_REPOSITORY_STATE_CHERRYPICK:
+    case GIT_REPOSITORY_STATE_CHERRYPICK_SEQUENCE:
+        return "a cherry-pick";
+    case GIT_REPOSITORY_STATE_REBASE:
+    case GIT_REPOSITORY_STATE_REBASE_INTERACTIVE:
+    case GIT_REPOSITORY_STATE_REBASE_MERGE:
+    case GIT_REPOSITORY_STATE_APPLY_MAILBOX_OR_REBASE:
+        return "a rebase";
+    case GIT_REPOSITORY_STATE_APPLY_MAILBOX:
+        return "an application of patches";
+    default:
+        return "an operation";
+    }
+}
+
+/// Returns the first line; empty if the file cannot be read.
+std::string firstLineOf(const std::string &path)
+{
+    std::ifstream file(path);
+    std::string line;
+    std::getline(file, line);
+    return line;
+}
+
+} // namespace
+
+void refuseSwitchInUnfinishedOperation(git_repository *repository)
+{
+    const int state = readRepositoryState(repository);
+    if (state < 0)
+    {
+        check(makeResult(state));
+    }
+    const char *const operation = describe(state);
+    if (operation != nullptr)
+    {
+        raiseGitError(GIT_ERROR, GIT_ERROR_REPOSITORY,
+                      std::string("cannot switch branches while ") + operation +
+                          " is under way: conclude or abort it first, see git status");
+    }
+}
+
+void refuseDeletionInUnfinishedOperation(git_repository *repository, const char *reference)
+{
+    static constexpr std::array<const char *, 3> files{"rebase-merge/head-name",
+                                                       "rebase-apply/head-name", "BISECT_START"};
+    const std::string folder = git_repository_path(repository);
+    const std::string name = reference;
+    for (const char *const file : files)
+    {
+        const std::string line = firstLineOf(folder + file);
+        // A bisection has the short name.
+        if (!line.empty() && (line == name || "refs/heads/" + line == name))
+        {
+            raiseGitError(GIT_ERROR, GIT_ERROR_REFERENCE,
+                          "cannot delete '" + name +
+                              "', to which a rebase or bisection returns: conclude or abort it "
+                              "first, see git status");
+        }
+    }
+}
+
+} // namespace vclink::git

@@ -1,0 +1,21 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <git2/types.h>
+
+namespace vclink::git
+{
+
+/// Throws if a merge, revert, cherry-pick, rebase or an application of patches is under way. After
+/// a switch it would be concluded on the other branch, and count work as merged that is not there,
+/// or drop commits. A bisection may go on.
+/// @throws LibGit2Exception also if the state cannot be read
+void refuseSwitchInUnfinishedOperation(git_repository *repository);
+
+/// Throws if a rebase or bisection in this working copy returns to the branch: without it, it could
+/// not be concluded.
+/// @param reference the full name of the branch
+/// @throws LibGit2Exception
+void refuseDeletionInUnfinishedOperation(git_repository *repository, const char *reference);
+
+} // namespace vclink::git
