@@ -259,10 +259,10 @@ TEST_F(InterruptedMerge, LeavesWhatGitLeftIfItIsRefused)
     diverge(writing("file", "ours\n"), writing("theirs", "x"));
     const std::string tree = repository_.git({"rev-parse", "main^{tree}"});
     repository_.write(".git/AUTO_MERGE", tree);
-    repository_.write("theirs", "in the way\n");
+    repository_.write("other", "edited\n");
     EXPECT_NE(failureOfMerge("topic"), "");
     EXPECT_EQ(repository_.read(".git/AUTO_MERGE"), tree);
-    repository_.remove("theirs");
+    repository_.git({"restore", "other"});
     merge("topic");
     EXPECT_FALSE(exists(".git/AUTO_MERGE"));
 }
