@@ -66,7 +66,7 @@ void refuseSwitchInUnfinishedOperation(git_repository *repository)
     const char *const operation = describe(state);
     if (operation != nullptr)
     {
-        raiseGitError(GIT_ERROR, GIT_ERROR_REPOSITORY,
+        raiseGitError(GIT_ECONFLICT, GIT_ERROR_CHECKOUT,
                       std::string("cannot switch branches while ") + operation +
                           " is under way: conclude or abort it first, see git status");
     }

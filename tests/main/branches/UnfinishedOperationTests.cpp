@@ -82,7 +82,7 @@ TEST_P(Unfinished, RefusesASwitchAndChangesNothing)
     for (const auto *const branch : {"other-branch", "main"})
     {
         EXPECT_EQ(failureOf([&] { branches().switchBranch(branch); }),
-                  (Failure{GIT_ERROR, GIT_ERROR_REPOSITORY,
+                  (Failure{GIT_ECONFLICT, GIT_ERROR_CHECKOUT,
                            "cannot switch branches while " + GetParam().text +
                                " is under way: conclude or abort it first, see git status"}));
     }
