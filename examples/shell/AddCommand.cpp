@@ -9,6 +9,8 @@
 #include "Session.hpp"
 #include "arguments.hpp"
 #include "commands.hpp"
+#include "failures.hpp"
+#include "foundation/core/except/IUserException.hpp"
 #include "links.hpp"
 #include "namedPaths.hpp"
 #include "names.hpp"
@@ -37,9 +39,9 @@ class AddCommand : public Command
                     throw CLI::RequiredError("PATH");
                 }
             });
-        line.footer(say("The files are in the next commit. A folder's ignored files are left out, "
-                        "and a name of one is\nrefused; so is a file that Git tracks already: its "
-                        "changes are in the next commit anyway."));
+        line.footer(say("The files are in the next commit. Ignored files in a folder are left out; "
+                        "an ignored file that is\nnamed itself is refused. A file that Git tracks "
+                        "already is refused too: commit takes its changes\nanyway."));
     }
 
     ExitStatus run(Session &session) override
@@ -50,10 +52,7 @@ class AddCommand : public Command
             lookUp(adapter, addsAll_ ? std::vector<std::string>{nativePath(root).string()}
                                      : paths_->results());
         refuseUnless(say("Nothing was added"), paths,
-                     [&root](const NamedPath &named) {
-                         return named.states.empty() ? explainAbsence(root, named)
-                                                     : explainLink(named, "git add");
-                     });
+                     [&root](const NamedPath &named) { return explain(root, named); });
         FileStateMap files;
         FileStateMap removed;
         for (const NamedPath &named : paths)
@@ -73,7 +72,7 @@ class AddCommand : public Command
         const ExitStatus status = runStoppable(session, Stops::Never,
                                                [&]
                                                {
-                                                   adapter.addFiles(literalNames(list, root));
+                                                   addNew(adapter, list);
                                                    for (const auto &entry : removed)
                                                    {
                                                        adapter.markResolved(entry.first);
@@ -94,6 +93,55 @@ class AddCommand : public Command
     static bool isNew(FileState::State state)
     {
         return state == FileState::Unversioned;
+    }
+
+    /// The back end also names tracked files below a folder in whose place a new file is.
+    static void addNew(CMAdapter &adapter, const std::vector<upath> &files)
+    {
+        try
+        {
+            adapter.addFiles(literalNames(files, adapter.getRootFolder()));
+        }
+        catch (const foundation::core::except::IUserException &failure)
+        {
+            if (failure.GetID().find("AlreadyAdded") == std::string::npos)
+            {
+                throw;
+            }
+            reportFailure();
+            throw ShellFailure(say("Nothing can be added in their place before you commit. git can "
+                                   "do it: use \"git add\"."));
+        }
+    }
+
+    static std::string explain(const upath &root, const NamedPath &named)
+    {
+        if (named.states.empty())
+        {
+            return explainAbsence(root, named);
+        }
+        const std::string reason = explainLink(named, "git add");
+        const auto own = named.states.find(named.path);
+        if (!reason.empty() || named.isFolder || own == named.states.end())
+        {
+            return reason;
+        }
+        std::error_code ignored;
+        const bool isThere = std::filesystem::exists(
+            std::filesystem::symlink_status(nativePath(named.path), ignored));
+        switch (own->second.getState())
+        {
+        case FileState::InConflict:
+            return say("it is in conflict: edit it until it is right, then mark it with "
+                       "\"vclink-shell resolved\"");
+        case FileState::Missing:
+        case FileState::Deleted:
+            return isThere ? reason : say("it is gone from the disk, and from the next commit");
+        case FileState::Unversioned:
+            return reason;
+        default:
+            return say("Git tracks it already: its changes are in the next commit anyway");
+        }
     }
 
     /// Files that are removed in the index, but on the disk. To the back end they are not new: it

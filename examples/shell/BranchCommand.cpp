@@ -4,11 +4,14 @@
 #include <CLI/CLI.hpp>
 
 #include "Output.hpp"
+#include "PushRefspec.hpp"
 #include "Session.hpp"
 #include "arguments.hpp"
 #include "commands.hpp"
 #include "failures.hpp"
+#include "gitProgram.hpp"
 #include "names.hpp"
+#include "remotes.hpp"
 #include "revisions.hpp"
 #include "runStoppable.hpp"
 #include "suggestions.hpp"
@@ -32,16 +35,57 @@ bool isUnnamedCommit(const git::BranchManager &manager, const std::string &text)
     return !isNamed && findRevision(manager, text + "^{commit}");
 }
 
+/// @throws ShellFailure if a branch is in the way of the new one
+void refuseTakenName(const git::BranchManager &manager, const std::string &name)
+{
+    if (isBranch(manager, name))
+    {
+        throw ShellFailure(
+            say("There is a branch '%1%' already. Choose another name, or use the branch that is "
+                "there:\n\"vclink-shell switch %2%\".",
+                showName(name), quoteForShell(name)));
+    }
+    for (const git::BranchPointer &branch : manager.getLocalBranches())
+    {
+        const std::string other = shortReference(branch.getName());
+        if (name.rfind(other + '/', 0) == 0 || other.rfind(name + '/', 0) == 0)
+        {
+            throw ShellFailure(say("Git can't have the branches '%1%' and '%2%' at a time, as one "
+                                   "is like a folder of the other.\nChoose another name.",
+                                   showName(name), showName(other)));
+        }
+    }
+}
+
+/// @throws ShellFailure if it failed because of the name of the new branch
+void explainName(const std::string &name, const git::LibGit2Exception &failure)
+{
+    constexpr int isInvalid = -12; // GIT_EINVALIDSPEC
+    if (failure.getError().getCode() == isInvalid || name == "HEAD" || name.front() == '-')
+    {
+        throw ShellFailure(say("'%1%' can't be the name of a branch. Blanks, control characters, "
+                               "\"..\", \"@{\", and any of ~^:?*[\\ can't\nbe in it; \"git help "
+                               "check-ref-format\" has all rules.",
+                               showName(name)));
+    }
+}
+
+/// Whether the current branch has all commits of another one, as far as git can tell.
+bool isMerged(CMAdapter &adapter, const std::string &tip)
+{
+    return runGit(nativePath(adapter.getRootFolder()), {"merge-base", "--is-ancestor", tip, "HEAD"})
+        .has_value();
+}
+
 class BranchCommand : public Command
 {
   public:
     void declare(CLI::App &line) override
     {
         name_ = declareName(line, "NAME", say("The branch"))->required();
-        start_ =
-            declareName(line, "START",
-                        say("Where the new branch begins: a branch, or a tag that is no object "
-                            "of\nits own; HEAD if it is left out"));
+        start_ = declareName(line, "START",
+                             say("Where the new branch begins: a branch, or a tag that is not "
+                                 "annotated;\nwithout it, HEAD"));
         line.add_flag("-d", deletes_, say("Delete the branch, merged or not"));
         line.callback([this] { checkStart(); });
         line.footer(say("Makes or deletes a branch. The current branch stays the same, and can't "
@@ -54,36 +98,34 @@ class BranchCommand : public Command
         const std::string name = name_->results().front();
         // The way back from a deletion.
         const std::string tip = findRevision(*manager, "refs/heads/" + name).value_or("");
-        if (deletes_ && !isBranch(*manager, name))
+        if (deletes_)
         {
-            throw ShellFailure(say("There is no branch '%1%'.", showName(name)) +
-                               suggestBranch(*manager, name));
+            refuseToDelete(*manager, name);
         }
+        const bool mayLoseCommits = deletes_ && !isMerged(session.adapter(), tip);
         try
         {
             const ExitStatus status =
                 runStoppable(session, Stops::Never, [&] { act(*manager, name); });
             if (status == Done)
             {
-                remark(deletes_ ? say("Deleted the branch %1%, which was at %2%.", name, tip)
-                                : say("Made the branch %1%.", name));
+                (mayLoseCommits ? inform : remark)(
+                    deletes_ ? say("Deleted the branch %1%, which was at %2%.", name, tip)
+                             : say("Made the branch %1%.", name));
             }
             return status;
         }
-        catch (const git::LibGit2Exception &)
+        catch (const git::LibGit2Exception &failure)
         {
-            if (!deletes_ && !findRevision(*manager, start()))
+            if (deletes_)
             {
-                if (start() == "HEAD")
-                {
-                    throw ShellFailure(say("There is no commit yet that a branch could begin at."));
-                }
-                throw ShellFailure(
-                    say("There is no branch and no commit '%1%'.", showName(start())) +
-                    suggestBranch(*manager, start()));
+                throw;
             }
-            if (deletes_ || !isUnnamedCommit(*manager, start()))
+            refuseUnknownStart(*manager);
+            refuseTakenName(*manager, name);
+            if (!isUnnamedCommit(*manager, start()))
             {
+                explainName(name, failure);
                 throw;
             }
             reportFailure();
@@ -95,6 +137,35 @@ class BranchCommand : public Command
     }
 
   private:
+    static void refuseToDelete(const git::BranchManager &manager, const std::string &name)
+    {
+        if (!isBranch(manager, name))
+        {
+            throw ShellFailure(say("There is no branch '%1%'.", showName(name)) +
+                               suggestBranch(manager, name));
+        }
+        if (findCurrentBranch(manager) == name)
+        {
+            throw ShellFailure(say("Nothing was deleted: '%1%' is the current branch. Switch to "
+                                   "another one first.",
+                                   showName(name)));
+        }
+    }
+
+    void refuseUnknownStart(const git::BranchManager &manager) const
+    {
+        if (findRevision(manager, start()))
+        {
+            return;
+        }
+        if (start() == "HEAD")
+        {
+            throw ShellFailure(say("There is no commit yet that a branch could begin at."));
+        }
+        throw ShellFailure(say("There is no branch and no commit '%1%'.", showName(start())) +
+                           suggestBranch(manager, start()));
+    }
+
     void act(git::BranchManager &manager, const std::string &name) const
     {
         if (deletes_)
@@ -116,7 +187,7 @@ class BranchCommand : public Command
     {
         if (deletes_ && !start_->empty())
         {
-            throw CLI::ValidationError("START", say("is not for a branch to delete"));
+            throw CLI::ValidationError("START", say("is not allowed with -d"));
         }
     }
 

@@ -28,7 +28,8 @@ class BranchesCommand : public Command
   public:
     void declare(CLI::App &line) override
     {
-        line.add_flag("-r", showsRemote_, say("Those that were fetched from remote repositories"));
+        line.add_flag("-r", showsRemote_,
+                      say("The branches that were fetched from remote repositories"));
         line.add_flag("-z", endWithNul_,
                       say("End each line with NUL, and write names byte for byte"));
         line.footer(

@@ -72,6 +72,11 @@ void setGroup(CLI::App &line)
     }
 }
 
+std::string describeUnknown(const std::string &command)
+{
+    return say("Unknown command '%1%'.", command) + suggestCommand(command);
+}
+
 } // namespace
 
 CommandLine::CommandLine()
@@ -82,9 +87,8 @@ CommandLine::CommandLine()
     setWords(*line_);
     line_->set_help_flag("-h,--help", say("Show this help"));
     line_->set_version_flag("--version", versionText, say("Show the versions, as version does"));
-    line_->footer(say("\"vclink-shell help COMMAND\" tells more about a command.\n\n"
-                      "Exit status: 0 done, 1 failed, 2 wrong usage, 128 and a signal's number "
-                      "stopped."));
+    line_->footer(say("\"vclink-shell help COMMAND\" describes a command.\n\nExit status: 0 done, "
+                      "1 failed, 2 wrong usage, 128 plus a signal's number if that stopped it."));
     // A file may have the name of a command: only the first word is one.
     line_->require_subcommand(0, 1);
     declareSettings();
@@ -152,8 +156,8 @@ void CommandLine::declareSettings()
                 "(if that is a terminal)"))
         ->type_name("WHEN");
     line_->add_flag("--bare", settings_.takesAnyBare,
-                    say("Also work in a bare repository inside a working copy, whose\n"
-                        "configuration may have come with a clone"));
+                    say("Also work in a bare repository inside a working copy. Its "
+                        "configuration\nmay have come with a clone, and can run commands"));
 }
 
 void CommandLine::declareCommands()
@@ -234,7 +238,10 @@ std::optional<ExitStatus> CommandLine::help(const std::string &command, Output &
     }
     if (text.empty())
     {
-        return refuse(say("Unknown command '%1%'.", command) + suggestCommand(command));
+        const std::string word = showHidden(command);
+        complain(describeUnknown(word) + '\n' +
+                 say("See \"%1%\".", std::string(program) + " help"));
+        return WrongUsage;
     }
     output.write(text);
     output.flush();
@@ -292,8 +299,7 @@ std::string CommandLine::describeExtra() const
                                 : instead);
     }
     const std::string word = showHidden(first);
-    return command == nullptr ? say("Unknown command '%1%'.", word) + suggestCommand(word)
-                              : say("Unexpected argument '%1%'.", word);
+    return command == nullptr ? describeUnknown(word) : say("Unexpected argument '%1%'.", word);
 }
 
 std::string CommandLine::describePlace(const CLI::App *command, const std::string &option) const

@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: MIT
+#include <algorithm>
 #include <string>
 #include <vector>
 
@@ -11,12 +12,12 @@
 #include "fl/i18n/convert.hpp"
 #include "mergeLeftovers.hpp"
 #include "namedPaths.hpp"
-#include "refusals.hpp"
 #include "renames.hpp"
 #include "runStoppable.hpp"
 #include "states.hpp"
 #include "texts.hpp"
 #include "unfinished.hpp"
+#include "vclink/git/LibGit2Exception.hpp"
 #include "workingCopy.hpp"
 
 namespace vclink::shell
@@ -53,11 +54,12 @@ void refuseEmpty(CMAdapter &adapter, const FileStateMap &states)
     const std::size_t untracked =
         filter(states, [](FileState::State state) { return !isTracked(state); }).size();
     const std::string nothing = say("Nothing was committed: no tracked file has changed.");
-    throw ShellFailure(untracked == 0 ? nothing
-                                      : nothing + '\n' +
-                                            say("Untracked: %1%. Add what is to be committed with "
-                                                "\"vclink-shell add\".",
-                                                countFiles(untracked)));
+    throw ShellFailure(
+        untracked == 0
+            ? nothing
+            : nothing + '\n' +
+                  say("Untracked: %1%. To commit them, add them with \"vclink-shell add\".",
+                      countFiles(untracked)));
 }
 
 class CommitCommand : public Command
@@ -72,18 +74,17 @@ class CommitCommand : public Command
                 ->option_text("MESSAGE")
                 ->required();
         line.add_flag_callback(
-            "-a,--all", [] {}, say("Changes nothing: a commit takes all changes anyway"));
+            "-a,--all", [] {}, say("Has no effect: a commit takes all changes anyway"));
         line.add_flag("--allow-empty", mayBeEmpty_, say("Commit even if nothing has changed"));
         line.add_flag("--allow-empty-message", mayBeSilent_, say("Commit with an empty message"));
         line.add_flag(
             "--as-is", takesAll_,
-            say("Commit files in conflict as they are, markers included, and in the midst\n"
-                "of a rebase, a bisection or a series of picked commits, which ends it"));
-        line.footer(
-            say("Commits all changes to tracked files, staged or not, and what was added or "
-                "removed. Concludes a\nmerge that is under way. The author comes from git's "
-                "settings user.name and user.email, or else\nfrom USER or LOGNAME and the "
-                "name of the host."));
+            say("Commit files in conflict as they are, conflict markers included; commit "
+                "also\nduring a rebase, a bisection or a series of picked commits, which ends it"));
+        line.footer(say("Commits all changes to tracked files, staged or not, and all that was "
+                        "added or removed. Concludes a\nmerge that is under way. The author comes "
+                        "from git's settings user.name and user.email; if they are\nnot set, from "
+                        "USER or LOGNAME and the name of the host."));
     }
 
     ExitStatus run(Session &session) override
@@ -107,21 +108,70 @@ class CommitCommand : public Command
         }
         tellSetAside(adapter);
         const ExitStatus status =
-            runStoppable(session, Stops::Never,
-                         [&] { adapter.commit(root, fl::i18n::utf8_to_ustring(message)); });
+            runStoppable(session, Stops::Never, [&] { commit(adapter, message); });
         if (status != Done)
         {
             return status;
         }
-        // What a sparse checkout leaves out is missing before and after.
-        const FileStateMap changed = filter(states, isChanged);
-        const std::size_t left = findLeftOut(adapter, changed, isChanged).size();
-        remark(states.empty() ? say("Committed.")
-                              : say("Committed %1%.", countFiles(changed.size() - left)));
+        remark(describeResult(adapter, states));
         return Done;
     }
 
   private:
+    static void commit(CMAdapter &adapter, const std::string &message)
+    {
+        try
+        {
+            adapter.commit(adapter.getRootFolder(), fl::i18n::utf8_to_ustring(message));
+        }
+        catch (const git::LibGit2Exception &failure)
+        {
+            const std::string commands = commandsOf(failure);
+            if (commands.empty())
+            {
+                throw;
+            }
+            throw ShellFailure(
+                isMergeInterrupted(adapter)
+                    ? say("Nothing was committed: a merge was interrupted before all of it was "
+                          "written, and a commit would\nleave the rest out. To begin again, run "
+                          "this in the root of the working copy:\n%1%",
+                          commands)
+                    : say("Nothing was committed: the index has nothing of what only the other "
+                          "side of the merge has changed.\nIf you put that back intentionally, run "
+                          "\"git commit\". To begin again, run this in the root of the\nworking "
+                          "copy:\n%1%",
+                          commands));
+        }
+    }
+
+    /// What the back end says to run after a merge that was interrupted; nothing for other
+    /// failures.
+    static std::string commandsOf(const git::LibGit2Exception &failure)
+    {
+        const std::string text = fl::i18n::ustring_to_utf8(failure.getError().getMessage());
+        const std::size_t begin = text.find("git diff-tree ");
+        return begin == std::string::npos ? std::string() : text.substr(begin);
+    }
+
+    static std::string describeResult(CMAdapter &adapter, const FileStateMap &states)
+    {
+        const FileStateMap changed = filter(states, isChanged);
+        // If Git tracks no file any more, all are committed.
+        const FileStateMap after = folderStates(adapter, adapter.getRootFolder());
+        // What a sparse checkout leaves out is missing before and after.
+        const auto left =
+            std::count_if(changed.begin(), changed.end(),
+                          [&after](const FileStateMap::value_type &entry)
+                          {
+                              const auto now = after.find(entry.first);
+                              return now != after.end() && isChanged(now->second.getState());
+                          });
+        return states.empty() ? say("Committed.")
+                              : say("Committed %1%.",
+                                    countFiles(changed.size() - static_cast<std::size_t>(left)));
+    }
+
     const CLI::Option *message_ = nullptr;
     bool mayBeEmpty_ = false;
     bool mayBeSilent_ = false;

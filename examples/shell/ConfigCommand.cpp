@@ -26,7 +26,7 @@ class ConfigCommand : public Command
     {
         line.add_flag(
             "--write", writes_,
-            say("Install the tools that come along, in place of the values that are there"));
+            say("Install the tools that come along; this replaces the values that are set"));
         line.footer(say("Shows the merge and diff tools in Git's configuration of this user: one "
                         "line for each that is set,\nits key, a tab, and its value."));
     }

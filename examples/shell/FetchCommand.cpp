@@ -30,10 +30,9 @@ class FetchCommand : public Command
                                  say("What to fetch, and where to, e.g. "
                                      "refs/heads/a:refs/remotes/origin/a;\nwithout any, what the "
                                      "remote's configuration says"));
-        line.footer(say("Updates the remote's branches and their tags here, e.g. origin/main. The "
+        line.footer(say("Downloads the remote's branches, e.g. as origin/main, and their tags. The "
                         "working copy stays as it\nis: see merge for the next step. A branch that "
-                        "was deleted at the remote stays here.\n\n"
-                        "Never prompts (see clone)."));
+                        "was deleted at the remote stays here.\n\nNever prompts (see clone)."));
     }
 
     ExitStatus run(Session &session) override

@@ -27,9 +27,9 @@ class HeadsCommand : public Command
         line.add_flag("-z", endWithNul_,
                       say("End each line with NUL, and write names byte for byte"));
         line.footer(say("One line for each reference of the remote: the id, a tab, and the full "
-                        "name; for a symbolic one,\nsuch as HEAD, another tab and the name that it "
-                        "means. A name that ends in \"^{}\" is the object\nthat a tag leads to.\n\n"
-                        "Never prompts (see clone)."));
+                        "name. A symbolic reference\nsuch as HEAD has another tab and the name "
+                        "that it points to. A name that ends in \"^{}\" is the\nobject that a tag "
+                        "points to.\n\nNever prompts (see clone)."));
     }
 
     ExitStatus run(Session &session) override

@@ -156,7 +156,7 @@ void InterruptWatch::answer(int signal)
     }
     if (activity_.quiet() >= patience)
     {
-        giveUp(say("Nothing was heard of the operation for a while."));
+        giveUp(say("The operation makes no progress."));
     }
 }
 

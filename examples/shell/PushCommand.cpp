@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: MIT
 #include <algorithm>
+#include <filesystem>
 #include <memory>
 #include <set>
 #include <string>
@@ -12,11 +13,13 @@
 #include "commands.hpp"
 #include "failures.hpp"
 #include "fl/i18n/convert.hpp"
+#include "gitProgram.hpp"
 #include "names.hpp"
 #include "remotes.hpp"
 #include "revisions.hpp"
 #include "runWithRemote.hpp"
 #include "texts.hpp"
+#include "vclink/git/LibGit2Exception.hpp"
 
 namespace vclink::shell
 {
@@ -31,12 +34,12 @@ class PushCommand : public Command
         remote_ = declareRemote(line);
         refspecs_ =
             declareNames(line, "REFSPEC",
-                         say("What to push, and where to: main, or mine:main; with nothing before\n"
-                             "the colon it is deleted there, with a plus in front it may lose\n"
-                             "commits there; without any, the current branch"));
-        line.footer(say("Sends commits to the remote, and moves its branches or tags. What the "
-                        "server rejects is named with\nits reason, and the status is 1.\n\n"
-                        "Never prompts (see clone)."));
+                         say("What to push: main, or mine:main to push mine to the remote's "
+                             "main.\n:main deletes the remote's main; +main overwrites it, and can "
+                             "lose\ncommits there. Without any, the current branch"));
+        line.footer(say("Sends commits to the remote, and moves its branches or tags. If the "
+                        "server rejects some, they are\nlisted with its reason, and the status is "
+                        "1.\n\nNever prompts (see clone)."));
     }
 
     ExitStatus run(Session &session) override
@@ -61,7 +64,7 @@ class PushCommand : public Command
                 dropWhatIsThere(*manager, *remote, name, refspecs);
                 if (isConfigured || !refspecs.empty())
                 {
-                    push(*remote, refspecs);
+                    push(session, *remote, name, refspecs);
                 }
             });
         return status == Done ? tell(notes, refspecs, name, isConfigured) : status;
@@ -112,14 +115,67 @@ class PushCommand : public Command
         refspecs.erase(std::remove_if(refspecs.begin(), refspecs.end(), isThere), refspecs.end());
     }
 
-    static void push(git::GitRemote &remote, const std::vector<PushRefspec> &refspecs)
+    static void push(Session &session, git::GitRemote &remote, const std::string &name,
+                     const std::vector<PushRefspec> &refspecs)
     {
         std::vector<std::string> texts;
+        texts.reserve(refspecs.size());
         for (const PushRefspec &refspec : refspecs)
         {
             texts.push_back(refspec.text());
         }
-        remote.push(readRefspecs(texts));
+        try
+        {
+            remote.push(readRefspecs(texts));
+        }
+        catch (const git::LibGit2Exception &failure)
+        {
+            constexpr int isNoFastForward = -11; // GIT_ENONFASTFORWARD
+            if (failure.getError().getCode() == isNoFastForward)
+            {
+                explainRefusal(session, remote, name, refspecs);
+            }
+            throw;
+        }
+    }
+
+    /// @throws ShellFailure that names what would lose commits, or would be another tag
+    static void explainRefusal(Session &session, const git::GitRemote &remote,
+                               const std::string &name, const std::vector<PushRefspec> &refspecs)
+    {
+        const std::filesystem::path root = nativePath(session.adapter().getRootFolder());
+        const std::vector<git::GitRemoteHead> heads = remote.getRemoteHeads();
+        for (const PushRefspec &refspec : refspecs)
+        {
+            const auto there = std::find_if(heads.begin(), heads.end(),
+                                            [&refspec](const git::GitRemoteHead &head)
+                                            { return head.name == refspec.target; });
+            if (there == heads.end() || refspec.source.empty() || refspec.mayLoseCommits)
+            {
+                continue;
+            }
+            const std::string target = shortReference(refspec.target);
+            const std::string names = refspec.source == refspec.target
+                                          ? target
+                                          : shortReference(refspec.source) + ':' + target;
+            const std::string forced =
+                "vclink-shell push " + quoteForShell(name) + ' ' + quoteForShell('+' + names);
+            if (refspec.target.rfind("refs/tags/", 0) == 0)
+            {
+                throw ShellFailure(say("Nothing was pushed: the tag '%1%' is another one at %2%. "
+                                       "To replace it there:\n%3%",
+                                       showName(target), name, forced));
+            }
+            if (!runGit(root,
+                        {"merge-base", "--is-ancestor", hexadecimal(there->oid), refspec.source}))
+            {
+                throw ShellFailure(
+                    say("Nothing was pushed: the branch '%1%' at %2% has commits that yours does "
+                        "not have.\nDownload them with \"vclink-shell fetch\", merge them, and "
+                        "push again. To discard them there instead:\n%3%",
+                        showName(target), name, forced));
+            }
+        }
     }
 
     /// The back end counts a push as done whatever the server made of it.

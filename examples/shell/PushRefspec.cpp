@@ -51,12 +51,14 @@ std::string completeSource(const git::BranchManager &manager, const std::string 
     {
         return name;
     }
-    const bool isBranch = findRevision(manager, std::string(heads) + name).has_value();
-    const bool isTag = findRevision(manager, std::string(tags) + name).has_value();
+    // "main~1" is a commit, but not the name of a branch.
+    const bool isName = name.find_first_of("~^:@") == std::string::npos;
+    const bool isBranch = isName && findRevision(manager, std::string(heads) + name).has_value();
+    const bool isTag = isName && findRevision(manager, std::string(tags) + name).has_value();
     return std::string(folderOf(name, isBranch, isTag)) + name;
 }
 
-/// The folder for a short name at the remote, by what is pushed there, or by what stands there.
+/// The folder for a short name at the remote, by what is pushed there, or by what is there.
 std::string completeTarget(const std::string &name, const std::string &source,
                            const AskHeads &askHeads)
 {

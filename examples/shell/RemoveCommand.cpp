@@ -28,8 +28,7 @@ class RemoveCommand : public Command
     {
         paths_ = declarePaths(line, say("Tracked files, and folders: all tracked files below them"))
                      ->required();
-        line.footer(
-            say("The files are gone in the next commit. They stay on the disk, untracked."));
+        line.footer(say("The next commit removes the files. They stay on the disk, untracked."));
     }
 
     ExitStatus run(Session &session) override
@@ -39,7 +38,7 @@ class RemoveCommand : public Command
         const std::vector<NamedPath> paths = lookUp(adapter, paths_->results());
         refuseUnless(say("Nothing was removed"), paths,
                      [&root](const NamedPath &named) { return explain(root, named); });
-        const Cover removed = cover(root, paths, isRemovable, LinkNames::None);
+        const Cover removed = choose(root, paths);
         refuseStrays(say("Nothing was removed"), adapter, paths, removed.list, isRemovable);
         const ExitStatus status =
             runStoppable(session, Stops::Never, [&] { adapter.removeFiles(removed.list); });
@@ -59,6 +58,30 @@ class RemoveCommand : public Command
         return isTracked(state) && state != FileState::Deleted;
     }
 
+    /// If both names of a renamed file are told to it, the back end removes neither: then each file
+    /// is named by itself, and only those that are to be removed.
+    static Cover choose(const upath &root, const std::vector<NamedPath> &paths)
+    {
+        Cover chosen;
+        bool hasDeleted = false;
+        bool hasAdded = false;
+        for (const NamedPath &named : paths)
+        {
+            FileStateMap meant = filter(named.states, isRemovable);
+            hasDeleted = hasDeleted || meant.size() != filter(named.states, isTracked).size();
+            hasAdded = hasAdded || !filter(meant, isAdded).empty();
+            const std::vector<upath> names = addressable(filterFollowed(meant, root, false), root);
+            chosen.list.insert(chosen.list.end(), names.begin(), names.end());
+            chosen.files.merge(meant);
+        }
+        return hasDeleted && hasAdded ? chosen : cover(root, paths, isRemovable, LinkNames::None);
+    }
+
+    static bool isAdded(FileState::State state)
+    {
+        return state == FileState::Added;
+    }
+
     static std::string explain(const upath &root, const NamedPath &named)
     {
         const std::string reason = explainUntracked(root, named);
@@ -69,7 +92,7 @@ class RemoveCommand : public Command
         const FileStateMap meant = filter(named.states, isRemovable);
         const bool isUseless =
             named.isFolder && !meant.empty() && filterFollowed(meant, root, false).empty();
-        return isUseless ? say("there are only symbolic links in it, which would be followed") : "";
+        return isUseless ? say("it has only symbolic links, which would be followed") : "";
     }
 
     const CLI::Option *paths_ = nullptr;

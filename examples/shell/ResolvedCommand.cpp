@@ -32,9 +32,9 @@ class ResolvedCommand : public Command
     {
         paths_ = declarePaths(line, say("Files, and folders: all files in conflict below them"))
                      ->required();
-        line.footer(say("Takes a file as it is now for the solution of its conflict, or its "
-                        "absence if it is gone from the\ndisk. The text is not examined. A file "
-                        "that is not in conflict is staged as it is."));
+        line.footer(say("The file as it is now becomes the solution of its conflict. If it is gone "
+                        "from the disk, the solution\nis to delete it. The text is not checked for "
+                        "conflict markers. A file that is not in conflict is\nstaged as it is."));
     }
 
     ExitStatus run(Session &session) override

@@ -1,6 +1,9 @@
 // SPDX-License-Identifier: MIT
+#include <algorithm>
 #include <exception>
+#include <filesystem>
 #include <string>
+#include <system_error>
 #include <vector>
 
 #include <CLI/CLI.hpp>
@@ -14,6 +17,8 @@
 #include "failures.hpp"
 #include "folderCover.hpp"
 #include "namedPaths.hpp"
+#include "names.hpp"
+#include "overlookedMarks.hpp"
 #include "refusals.hpp"
 #include "runStoppable.hpp"
 #include "states.hpp"
@@ -34,12 +39,12 @@ class RevertCommand : public Command
         paths_ = declarePaths(line, say("Tracked files, and folders: all tracked files below them"))
                      ->required();
         line.add_flag("--forget", forgets_, say("Keep no copy of what is discarded"));
-        line.footer(say("Discards all changes to the files, staged or not: they become as in the "
-                        "last commit. What is\ndiscarded is kept as Git objects, and a line says "
-                        "how to restore it. A file that was only added\nbecomes untracked, and "
-                        "keeps its text.\n\n"
-                        "Ctrl-C stops it until the first file is written: the files are as they "
-                        "were then, but staged changes\nmay be unstaged."));
+        line.footer(
+            say("Discards all changes to the files, staged or not: they become as in the last "
+                "commit. What is\ndiscarded is stored in the repository first, and the command "
+                "that restores it is printed. A file\nthat was only added becomes untracked, and "
+                "keeps its text.\n\nCtrl-C stops it until the first file is written. The files are "
+                "unchanged then, but staged changes\nmay be unstaged."));
     }
 
     ExitStatus run(Session &session) override
@@ -49,7 +54,11 @@ class RevertCommand : public Command
         std::vector<NamedPath> paths = lookUp(adapter, paths_->results());
         addOverlooked(adapter, paths);
         refuseUnless(say("Nothing was reverted"), paths,
-                     [&root](const NamedPath &named) { return explainUntracked(root, named); });
+                     [&](const NamedPath &named)
+                     {
+                         const std::string reason = explainUntracked(root, named);
+                         return reason.empty() ? explainFileInPlace(root, named, paths) : reason;
+                     });
         const Cover reverted = cover(root, paths, isChanged, LinkNames::Patterns);
         refuseStrays(say("Nothing was reverted"), adapter, paths, reverted.list, isChanged);
         const ExitStatus status =
@@ -72,6 +81,29 @@ class RevertCommand : public Command
     }
 
   private:
+    /// Why nothing can be written below a name: a file has that of a folder.
+    static std::string explainFileInPlace(const upath &root, const NamedPath &named,
+                                          const std::vector<NamedPath> &paths)
+    {
+        const std::filesystem::path top = nativePath(root);
+        std::filesystem::path place = nativePath(named.path).parent_path();
+        while (place != top && place.has_relative_path())
+        {
+            std::error_code ignored;
+            const ustring text = makePath(place).string();
+            const bool isNamed = std::any_of(paths.begin(), paths.end(),
+                                             [&text](const NamedPath &other)
+                                             { return liesIn(text, other.path.string()); });
+            if (!isNamed && !named.isLink && std::filesystem::is_regular_file(place, ignored))
+            {
+                return say("%1% is a file now: move it out of the way, or revert it too",
+                           showPath(makePath(place)));
+            }
+            place = place.parent_path();
+        }
+        return {};
+    }
+
     static void tell(const std::string &wayBack)
     {
         if (!wayBack.empty())
@@ -80,7 +112,7 @@ class RevertCommand : public Command
         }
     }
 
-    /// @throws CancelledOperationException if the person has asked to stop meanwhile
+    /// @throws CancelledOperationException if the person asked to stop while it stored
     static WayBack keep(Session &session, const std::vector<NamedPath> &paths,
                         const Cover &reverted)
     {
@@ -96,6 +128,7 @@ class RevertCommand : public Command
     /// Says how to restore what is discarded, once that may have been.
     static void revert(Session &session, const std::vector<upath> &files, const WayBack &wayBack)
     {
+        const OverlookedMarks marks(nativePath(session.adapter().getRootFolder()));
         try
         {
             session.adapter().revertFiles(files);
@@ -110,11 +143,13 @@ class RevertCommand : public Command
                 dynamic_cast<const util::exception::CancelledOperationException *>(&failure) !=
                 nullptr;
             tell(isWriting || isCancelled ? wayBack.staged : "");
+            marks.restore();
             throw;
         }
         session.progressLine().end();
         tell(wayBack.files);
         tell(wayBack.staged);
+        marks.restore();
     }
 
     const CLI::Option *paths_ = nullptr;

@@ -24,7 +24,7 @@ namespace
 std::string explainRefusal(const CMAdapterFactory &factory, const std::filesystem::path &folder,
                            const std::shared_ptr<ShellInteractor> &interactor)
 {
-    const std::string owner = explainOwner(folder.string());
+    std::string owner = explainOwner(folder.string());
     if (!owner.empty())
     {
         return owner;
@@ -78,11 +78,10 @@ void refuseBareInWorkingCopy(const std::filesystem::path &repository)
         folder = folder.parent_path();
         if (hasGitEntry(folder))
         {
-            throw ShellFailure(
-                say("%1% is a bare repository inside the working copy %2%. If it came with a "
-                    "clone, its\nconfiguration did too, and may name commands that then run. If "
-                    "you trust it, use --bare.",
-                    repository.string(), folder.string()));
+            throw ShellFailure(say(
+                "%1% is a bare repository inside the working copy %2%. If it came with a clone, so "
+                "did\nits configuration, which can run commands. If you trust it, use --bare.",
+                repository.string(), folder.string()));
         }
     }
 }

@@ -41,7 +41,7 @@ class Session
     ///         working copy, and what the back end throws
     CMAdapter &adapter();
 
-    /// Where the program was started, before -C.
+    /// The folder in which the program was started, before -C.
     const std::filesystem::path &startFolder() const noexcept;
 
     /// Notes that the program is to end as by this signal, whatever the command's own status is.

@@ -32,9 +32,10 @@ void refuseOtherFiles(const git::BranchManager &manager, const std::string &name
         findRevision(manager, "refs/heads/" + name + "^{tree}");
     if (branch && findRevision(manager, name + "^{tree}") != branch)
     {
-        throw ShellFailure(say("Nothing was switched: %1% is a tag too, whose files would be taken "
-                               "for the branch's.",
-                               name));
+        throw ShellFailure(
+            say("Nothing was switched: there is also a tag %1%, and its files would be written "
+                "instead of the\nbranch's. Rename the tag or the branch first.",
+                name));
     }
 }
 
@@ -44,12 +45,11 @@ class SwitchCommand : public Command
     void declare(CLI::App &line) override
     {
         name_ = declareName(line, "NAME", say("A local branch"))->required();
-        line.footer(
-            say("Writes the branch's files, and makes it the current one. Uncommitted "
-                "changes stay if both branches\nhave the same text there; otherwise nothing "
-                "is switched. Overwrites an ignored file that the branch\ntracks.\n\n"
-                "Ctrl-C stops it until the first file is written: nothing has changed "
-                "then."));
+        line.footer(say(
+            "Makes the branch the current one, and writes its files. Uncommitted changes to a file "
+            "are kept if\nthe file is the same in both branches; otherwise switch refuses. Ignored "
+            "files that the branch\ntracks are overwritten without a copy.\n\nCtrl-C stops it "
+            "until the first file is written: nothing has changed then."));
     }
 
     ExitStatus run(Session &session) override

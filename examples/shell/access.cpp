@@ -47,13 +47,13 @@ std::string explainKey(const git::GitError &failure)
     const char *const agent = std::getenv("SSH_AUTH_SOCK");
     if (agent == nullptr || *agent == '\0')
     {
-        return say("The server asked for a key. Keys are taken from an ssh agent only, and "
-                   "SSH_AUTH_SOCK names none.\nStart one with \"eval $(ssh-agent)\", and give it "
-                   "the key with \"ssh-add\".");
+        return say(
+            "The server asked for a key. Only an ssh agent provides keys, and SSH_AUTH_SOCK names "
+            "none.\nStart one with \"eval $(ssh-agent)\", and add the key with \"ssh-add\".");
     }
     if (!answers(agent))
     {
-        return say("The server asked for a key. Keys are taken from an ssh agent only, and the one "
+        return say("The server asked for a key. Only an ssh agent provides keys, and the one "
                    "that\nSSH_AUTH_SOCK names does not answer: %1%",
                    agent);
     }
@@ -76,8 +76,8 @@ std::string explainRefusedAccess(const git::GitError &failure, unsigned credenti
         return say("The server asked for a user name: put it before the host, as in "
                    "ssh://NAME@HOST/PATH.");
     }
-    return say("The server asked for a password, and none is ever given: only an ssh agent is "
-               "asked, for keys.");
+    return say("The server asked for a password. This program never sends one; it only uses the "
+               "keys of an ssh agent.");
 }
 
 } // namespace vclink::shell

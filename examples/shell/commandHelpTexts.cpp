@@ -14,9 +14,9 @@ constexpr Translation commandHelpRows[] = {
      "新しいファイルとフォルダー (その中のすべての新しいファイル)"},
     {"All new files of the working copy", "Alle neuen Dateien der Arbeitskopie",
      "作業コピーのすべての新しいファイル"},
-    {"The files are in the next commit. A folder's ignored files are left out, and a name of one "
-     "is\nrefused; so is a file that Git tracks already: its changes are in the next commit "
-     "anyway.",
+    {"The files are in the next commit. Ignored files in a folder are left out; an ignored file "
+     "that is\nnamed itself is refused. A file that Git tracks already is refused too: commit "
+     "takes its changes\nanyway.",
      "Die Dateien sind im nächsten Commit. Ignorierte Dateien eines Ordners bleiben weg; einzeln "
      "genannt\nwerden sie abgelehnt. Das gilt auch für Dateien, die Git schon kennt: Ihre "
      "Änderungen sind ohnehin\nim nächsten Commit.",
@@ -33,18 +33,16 @@ constexpr Translation commandHelpRows[] = {
      "属性ごとに 1 行を .gitattributes と同じ形式で表示します: "
      "\"NAME\"、\"-NAME\"、\"NAME=値\"、\n指定がなければ \"!NAME\"。"},
     {"The branch", "Der Branch", "ブランチ"},
-    {"Where the new branch begins: a branch, or a tag that is no object of\nits own; HEAD if it is "
-     "left out",
-     "Wo der neue Branch beginnt: ein Branch oder ein Tag, der kein eigenes\nObjekt ist; ohne "
-     "Angabe HEAD",
-     "新しいブランチの開始点: ブランチ、または独立したオブジェクトでないタグ。\n省略すると HEAD"},
+    {"Where the new branch begins: a branch, or a tag that is not annotated;\nwithout it, HEAD",
+     "Wo der neue Branch beginnt: ein Branch oder ein nicht annotierter Tag;\nohne Angabe HEAD",
+     "新しいブランチの開始点: ブランチ、または注釈のないタグ。\n省略すると HEAD"},
     {"Delete the branch, merged or not", "Den Branch löschen, zusammengeführt oder nicht",
      "ブランチを削除する (マージ済みかどうかを問わない)"},
     {"Makes or deletes a branch. The current branch stays the same, and can't be deleted.",
      "Legt einen Branch an oder löscht ihn. Der aktuelle Branch bleibt derselbe und kann nicht "
      "gelöscht\nwerden.",
      "ブランチを作成または削除します。現在のブランチは変わらず、削除できません。"},
-    {"Those that were fetched from remote repositories",
+    {"The branches that were fetched from remote repositories",
      "Die Branches, die von entfernten Repositorys geholt wurden", "リモートから取得したブランチ"},
     {"End each line with NUL, and write names byte for byte",
      "Jede Zeile mit NUL beenden und Namen Byte für Byte schreiben",
@@ -73,22 +71,22 @@ constexpr Translation commandHelpRows[] = {
      "ピーの\nリモート \"origin\" になります。\n\n入力は求めません。鍵は ssh "
      "エージェントから取得し、パスワードは送りません。証明書とホスト鍵は\nすべて受け入れます。"},
     {"What the commit says", "Was der Commit sagt", "コミットメッセージ"},
-    {"Changes nothing: a commit takes all changes anyway",
+    {"Has no effect: a commit takes all changes anyway",
      "Ändert nichts: Ein Commit nimmt ohnehin alle Änderungen",
      "何も変わりません (コミットは常にすべての変更を含みます)"},
     {"Commit even if nothing has changed", "Auch committen, wenn nichts geändert ist",
      "変更がなくてもコミットする"},
     {"Commit with an empty message", "Mit einer leeren Nachricht committen",
      "空のメッセージでコミットする"},
-    {"Commit files in conflict as they are, markers included, and in the midst\nof a rebase, a "
-     "bisection or a series of picked commits, which ends it",
+    {"Commit files in conflict as they are, conflict markers included; commit also\nduring a "
+     "rebase, a bisection or a series of picked commits, which ends it",
      "Dateien in Konflikt committen, wie sie sind, samt Markierungen, und\nauch mitten in einem "
      "Rebase, einer Bisection oder einer Reihe von\nCommits, was sie beendet",
      "競合しているファイルをマーカーも含めてそのままコミットする。リベース、\n二分探索、連続したチ"
      "ェリーピックの途中でも行い、それを終わらせる"},
-    {"Commits all changes to tracked files, staged or not, and what was added or removed. "
+    {"Commits all changes to tracked files, staged or not, and all that was added or removed. "
      "Concludes a\nmerge that is under way. The author comes from git's settings user.name and "
-     "user.email, or else\nfrom USER or LOGNAME and the name of the host.",
+     "user.email; if they are\nnot set, from USER or LOGNAME and the name of the host.",
      "Committet alle Änderungen an Dateien, die Git kennt, vorgemerkt oder nicht, und was "
      "hinzugefügt oder\nentfernt wurde. Schließt einen laufenden Merge ab. Der Autor kommt aus den "
      "Git-Einstellungen\nuser.name und user.email, sonst aus USER oder LOGNAME und dem Namen des "
@@ -96,8 +94,8 @@ constexpr Translation commandHelpRows[] = {
      "追跡されているファイルの変更を、ステージの有無にかかわらず、追加や削除とともにすべてコミット"
      "します。\n進行中のマージを完了します。作成者は Git の設定 user.name と user.email "
      "から、なければ USER または\nLOGNAME とホスト名から決まります。"},
-    {"Install the tools that come along, in place of the values that are there",
-     "Die mitgelieferten Werkzeuge anstelle der vorhandenen Werte eintragen",
+    {"Install the tools that come along; this replaces the values that are set",
+     "Die mitgelieferten Werkzeuge eintragen; vorhandene Werte werden ersetzt",
      "既存の値の代わりに付属のツールを設定する"},
     {"Shows the merge and diff tools in Git's configuration of this user: one line for each that "
      "is set,\nits key, a tab, and its value.",
@@ -117,7 +115,7 @@ constexpr Translation commandHelpRows[] = {
      "Konfiguration des entfernten Repositorys sagt",
      "取得するものと保存先。例: "
      "refs/heads/a:refs/remotes/origin/a。\n省略するとリモートの設定に従う"},
-    {"Updates the remote's branches and their tags here, e.g. origin/main. The working copy stays "
+    {"Downloads the remote's branches, e.g. as origin/main, and their tags. The working copy stays "
      "as it\nis: see merge for the next step. A branch that was deleted at the remote stays "
      "here.\n\nNever prompts (see clone).",
      "Bringt die Branches des entfernten Repositorys und ihre Tags hier auf den neuesten Stand, z. "
@@ -127,9 +125,9 @@ constexpr Translation commandHelpRows[] = {
      "を更新します。作業コピーは変わりません。次の手順は\nmerge "
      "を参照してください。リモートで削除されたブランチはここに残ります。\n\n入力は求めません "
      "(clone を参照)。"},
-    {"One line for each reference of the remote: the id, a tab, and the full name; for a symbolic "
-     "one,\nsuch as HEAD, another tab and the name that it means. A name that ends in \"^{}\" is "
-     "the object\nthat a tag leads to.\n\nNever prompts (see clone).",
+    {"One line for each reference of the remote: the id, a tab, and the full name. A symbolic "
+     "reference\nsuch as HEAD has another tab and the name that it points to. A name that ends in "
+     "\"^{}\" is the\nobject that a tag points to.\n\nNever prompts (see clone).",
      "Eine Zeile je Referenz des entfernten Repositorys: die Id, ein Tabulator und der volle Name; "
      "bei\neiner symbolischen wie HEAD noch ein Tabulator und der Name, für den sie steht. Ein "
      "Name mit \"^{}\"\nam Ende ist das Objekt, zu dem ein Tag führt.\n\nFragt nie nach (siehe "
@@ -164,17 +162,17 @@ constexpr Translation commandHelpRows[] = {
      "\"yes\" または \"no\" を出力し、ステータス 0 または 1 "
      "で終わります。作業コピーのルートとベアリポジトリは\n\"yes\"、その中のフォルダーは \"no\" "
      "です。"},
-    {"What to push, and where to: main, or mine:main; with nothing before\nthe colon it is deleted "
-     "there, with a plus in front it may lose\ncommits there; without any, the current branch",
-     "Was hochzuladen ist und wohin: main oder mine:main; mit nichts vor dem\nDoppelpunkt wird "
-     "dort gelöscht, mit einem Plus davor können dort Commits\nverloren gehen; ohne Angabe der "
-     "aktuelle Branch",
-     "送るものと送り先: main、または "
-     "mine:"
-     "main。コロンの前が空なら送り先で削除し、\n前にプラスを付けると送り先のコミットが失われること"
-     "があります。\n省略すると現在のブランチ"},
-    {"Sends commits to the remote, and moves its branches or tags. What the server rejects is "
-     "named with\nits reason, and the status is 1.\n\nNever prompts (see clone).",
+    {"What to push: main, or mine:main to push mine to the remote's main.\n:main deletes the "
+     "remote's main; +main overwrites it, and can lose\ncommits there. Without any, the current "
+     "branch",
+     "Was hochzuladen ist: main, oder mine:main, um mine nach main hochzuladen.\n:main löscht main "
+     "dort; +main überschreibt es, dort können Commits\nverloren gehen. Ohne Angabe der aktuelle "
+     "Branch",
+     "送るもの: main、または mine:main (mine をリモートの main に送る)。\n:main はリモートの main "
+     "を削除し、+main は上書きします "
+     "(コミットが失われること\nがあります)。省略すると現在のブランチ"},
+    {"Sends commits to the remote, and moves its branches or tags. If the server rejects some, "
+     "they are\nlisted with its reason, and the status is 1.\n\nNever prompts (see clone).",
      "Lädt Commits in das entfernte Repository hoch und bewegt seine Branches oder Tags. Was der "
      "Server\nablehnt, wird mit seinem Grund genannt, und der Status ist 1.\n\nFragt nie nach "
      "(siehe clone).",
@@ -183,25 +181,27 @@ constexpr Translation commandHelpRows[] = {
     {"Tracked files, and folders: all tracked files below them",
      "Dateien, die Git kennt, und Ordner: alle solchen Dateien darin",
      "追跡されているファイルとフォルダー (その中のすべての追跡されているファイル)"},
-    {"The files are gone in the next commit. They stay on the disk, untracked.",
+    {"The next commit removes the files. They stay on the disk, untracked.",
      "Die Dateien fehlen im nächsten Commit. Auf der Platte bleiben sie, unversioniert.",
      "ファイルは次のコミットからなくなります。ディスクには追跡されない状態で残ります。"},
     {"Files, and folders: all files in conflict below them",
      "Dateien und Ordner: alle Dateien in Konflikt darin",
      "ファイルとフォルダー (その中の競合しているすべてのファイル)"},
-    {"Takes a file as it is now for the solution of its conflict, or its absence if it is gone "
-     "from the\ndisk. The text is not examined. A file that is not in conflict is staged as it is.",
-     "Nimmt eine Datei, wie sie jetzt ist, als Lösung ihres Konflikts, oder ihr Fehlen, wenn sie "
-     "von der\nPlatte verschwunden ist. Der Text wird nicht geprüft. Eine Datei ohne Konflikt wird "
-     "vorgemerkt, wie\nsie ist.",
-     "今のファイルを競合の解決結果とします。ディスクから消えていれば、それが解決結果です。内容は調"
-     "べません。\n競合していないファイルは、そのままステージされます。"},
+    {"The file as it is now becomes the solution of its conflict. If it is gone from the disk, the "
+     "solution\nis to delete it. The text is not checked for conflict markers. A file that is not "
+     "in conflict is\nstaged as it is.",
+     "Die Datei, wie sie jetzt ist, wird zur Lösung ihres Konflikts. Ist sie von der Platte "
+     "verschwunden,\nist die Lösung, sie zu löschen. Konfliktmarkierungen im Text werden nicht "
+     "bemerkt. Eine Datei ohne\nKonflikt wird vorgemerkt, wie sie ist.",
+     "今のファイルを競合の解決結果とします。ディスクから消えていれば、削除が解決結果です。競合マー"
+     "カーが\n残っていても調べません。競合していないファイルは、そのままステージされます。"},
     {"Keep no copy of what is discarded", "Keine Kopie dessen behalten, was verworfen wird",
      "破棄する内容を保存しない"},
     {"Discards all changes to the files, staged or not: they become as in the last commit. What "
-     "is\ndiscarded is kept as Git objects, and a line says how to restore it. A file that was "
-     "only added\nbecomes untracked, and keeps its text.\n\nCtrl-C stops it until the first file "
-     "is written: the files are as they were then, but staged changes\nmay be unstaged.",
+     "is\ndiscarded is stored in the repository first, and the command that restores it is "
+     "printed. A file\nthat was only added becomes untracked, and keeps its text.\n\nCtrl-C stops "
+     "it until the first file is written. The files are unchanged then, but staged changes\nmay be "
+     "unstaged.",
      "Verwirft alle Änderungen an den Dateien, vorgemerkt oder nicht: Sie werden wie im letzten "
      "Commit. Was\nverworfen wird, bleibt als Git-Objekt erhalten, und eine Zeile sagt, wie es "
      "zurückkommt. Eine nur\nhinzugefügte Datei wird unversioniert und behält ihren "
@@ -237,14 +237,14 @@ constexpr Translation commandHelpRows[] = {
      "Nur diese Dateien und alle Dateien in diesen Ordnern",
      "これらのファイルと、これらのフォルダー内のすべてのファイルだけ"},
     {"A local branch", "Ein lokaler Branch", "ローカルブランチ"},
-    {"Writes the branch's files, and makes it the current one. Uncommitted changes stay if both "
-     "branches\nhave the same text there; otherwise nothing is switched. Overwrites an ignored "
-     "file that the branch\ntracks.\n\nCtrl-C stops it until the first file is written: nothing "
-     "has changed then.",
-     "Schreibt die Dateien des Branch und macht ihn zum aktuellen. Änderungen ohne Commit bleiben, "
-     "wenn\nbeide Branches dort denselben Text haben; sonst wird nicht gewechselt. Überschreibt "
-     "eine ignorierte\nDatei, die der Branch kennt.\n\nStrg-C hält an, bis die erste Datei "
-     "geschrieben wird: Dann ist nichts geändert.",
+    {"Makes the branch the current one, and writes its files. Uncommitted changes to a file are "
+     "kept if\nthe file is the same in both branches; otherwise switch refuses. Ignored files that "
+     "the branch\ntracks are overwritten without a copy.\n\nCtrl-C stops it until the first file "
+     "is written: nothing has changed then.",
+     "Macht den Branch zum aktuellen und schreibt seine Dateien. Änderungen ohne Commit an einer "
+     "Datei\nbleiben, wenn die Datei in beiden Branches gleich ist; sonst wird nicht gewechselt. "
+     "Ignorierte\nDateien, die der Branch kennt, werden ohne Kopie überschrieben.\n\nStrg-C hält "
+     "an, bis die erste Datei geschrieben wird: Dann ist nichts geändert.",
      "ブランチのファイルを書き出し、現在のブランチにします。両方のブランチで内容が同じファイルの未"
      "コミットの\n変更は残ります。そうでない場合は切り替えません。ブランチが追跡する、無視されるフ"
      "ァイルは上書きします。\n\nCtrl-C "
@@ -255,10 +255,8 @@ constexpr Translation commandHelpRows[] = {
     {"tracked and unchanged", "bekannt und unverändert", "追跡されていて変更がない"},
     {"changed, staged or not", "geändert, vorgemerkt oder nicht",
      "変更がある (ステージの有無を問わない)"},
-    {"new, and to be in the next commit", "neu, und im nächsten Commit",
-     "新規で、次のコミットに入る"},
-    {"to be gone in the next commit", "im nächsten Commit nicht mehr da",
-     "次のコミットからなくなる"},
+    {"new, and in the next commit", "neu, und im nächsten Commit", "新規で、次のコミットに入る"},
+    {"deleted by the next commit", "im nächsten Commit nicht mehr da", "次のコミットからなくなる"},
     {"tracked, but gone from the disk", "bekannt, aber von der Platte verschwunden",
      "追跡されているが、ディスクにない"},
     {"in a conflict that is not resolved yet", "in einem Konflikt, der noch nicht gelöst ist",

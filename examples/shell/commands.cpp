@@ -20,7 +20,7 @@ const std::vector<CommandEntry> &commandTable()
         {"switch", "Make another branch the current one, and write its files", makeSwitchCommand},
         {"current", "Show the name of the current branch", makeCurrentCommand},
         {"rev", "Show the id of a revision", makeRevisionCommand},
-        {"state", "Tell whether a merge or another operation is unfinished", makeStateCommand},
+        {"state", "Show whether a merge or another operation is unfinished", makeStateCommand},
         {"merge", "Merge a branch into the current one", makeMergeCommand},
         {"clone", "Copy a repository into a new working copy", makeCloneCommand},
         {"fetch", "Download a remote's branches", makeFetchCommand},
@@ -29,7 +29,7 @@ const std::vector<CommandEntry> &commandTable()
         {"attr", "Show Git's attributes of a file", makeAttributesCommand},
         {"config", "Show or install the merge and diff tools in Git's configuration",
          makeConfigCommand},
-        {"probe", "Tell whether a folder is a working copy or repository that can be served",
+        {"probe", "Show whether a folder is a working copy or repository that can be served",
          makeProbeCommand},
         {"version", "Show the versions of this program and of libgit2", makeVersionCommand}};
     return table;

@@ -149,9 +149,9 @@ class Index
         std::vector<StagedChange> files;
         for (const IndexEntry &entry : entries_)
         {
-            if (entry.isOverlooked && isReverted(entry.name) && !isSubmodule(entry.name))
+            if (entry.isOverlooked() && isReverted(entry.name) && !isSubmodule(entry.name))
             {
-                files.push_back({entry.name, entry.mode, entry.mode, entry.id});
+                files.push_back({entry.name, entry.mode, entry.mode, entry.id, false});
             }
         }
         return selectOthersThanOnDisk(root_, files, Filters::Ignored);
@@ -236,10 +236,10 @@ void refuseObstacles(const fs::path &root, const std::map<std::string, std::stri
     }
     if (!text.empty())
     {
-        throw ShellFailure(say("Nothing was reverted, as no copy can be kept of what would be "
-                               "discarded:%1%\nMove it out of the way, or discard it for good with "
-                               "--forget.",
-                               text));
+        throw ShellFailure(
+            say("Nothing was reverted, because these can't be stored first:%1%\nMove them out of "
+                "the way, or discard them without a copy with --forget.",
+                text));
     }
 }
 
@@ -282,7 +282,8 @@ WayBack keep(Session &session, const std::vector<NamedPath> &paths, const FileSt
     }
     std::vector<StagedChange> staged = index.changes();
     staged.erase(std::remove_if(staged.begin(), staged.end(),
-                                [](const StagedChange &change) { return change.isDeleted(); }),
+                                [](const StagedChange &change)
+                                { return change.isDeleted() || change.isIntended; }),
                  staged.end());
     if (!selectOthersThanOnDisk(root, staged, Filters::Applied).empty())
     {
@@ -325,8 +326,8 @@ WayBack keepContents(Session &session, const std::vector<NamedPath> &paths,
     }
     catch (const StoreFailure &failure)
     {
-        throw ShellFailure(say("Nothing was reverted, as what would be discarded can't be stored: "
-                               "%1%.\nTo discard it for good, use --forget.",
+        throw ShellFailure(say("Nothing was reverted, because the changes can't be stored first: "
+                               "%1%.\nTo discard them without a copy, use --forget.",
                                failure.what()));
     }
 }

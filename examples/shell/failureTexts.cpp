@@ -22,9 +22,9 @@ constexpr Translation failureRows[] = {
      "Das Repository gehört %1%. Wenn Sie ihm vertrauen: git config --global --add safe.directory "
      "%2%",
      "リポジトリの所有者は %1% です。信頼できる場合: git config --global --add safe.directory %2%"},
-    {"Get the remote's commits with \"vclink-shell fetch\", merge them, and push again. To lose "
-     "them "
-     "there,\nput a plus before the branch: \"vclink-shell push REMOTE +BRANCH\".",
+    {"Download the remote's commits with \"vclink-shell fetch\", merge them, and push again. To "
+     "discard\nthem there instead, put a plus before the branch: \"vclink-shell push REMOTE "
+     "+BRANCH\".",
      "Holen Sie die Commits von dort mit \"vclink-shell fetch\", führen Sie sie zusammen, und "
      "pushen "
      "Sie noch\neinmal. Um sie dort zu verlieren, setzen Sie ein Plus vor den Branch: "
@@ -34,14 +34,83 @@ constexpr Translation failureRows[] = {
      "ト"
      "を失ってよい場合は、ブランチの前に + を付けてください: \"vclink-shell push REMOTE "
      "+BRANCH\"。"},
-    {"%1% has the format, in core.repositoryformatversion and extensions. If git can work "
-     "here,\nuse "
-     "git.",
+    {"libgit2 does not know the format of this repository; core.repositoryformatversion and "
+     "extensions in\n%1% describe it. If git can work here, use git.",
      "Das Format steht in %1%, unter core.repositoryformatversion und extensions. Wenn git hier "
      "arbeiten kann,\nbenutzen Sie git.",
      "形式は %1% の core.repositoryformatversion と extensions にあります。git "
      "が使える場合は、git を使ってください。"},
     {"%1%.", "%1%.", "%1%。"},
+    {"There is a branch '%1%' already. Choose another name, or use the branch that is "
+     "there:\n\"vclink-shell switch %2%\".",
+     "Einen Branch '%1%' gibt es schon. Wählen Sie einen anderen Namen, oder benutzen Sie "
+     "diesen:\n\"vclink-shell switch %2%\".",
+     "ブランチ '%1%' "
+     "は既にあります。別の名前を選ぶか、そのブランチを使ってください:\n\"vclink-shell "
+     "switch %2%\"。"},
+    {"Git can't have the branches '%1%' and '%2%' at a time, as one is like a folder of the "
+     "other.\nChoose another name.",
+     "Git kann die Branches '%1%' und '%2%' nicht zugleich haben, da einer wie ein Ordner des "
+     "anderen ist.\nWählen Sie einen anderen Namen.",
+     "Git ではブランチ '%1%' と '%2%' は同時に存在できません "
+     "(一方が他方のフォルダーのような名前です)。\n別の名前を選んでください。"},
+    {"'%1%' can't be the name of a branch. Blanks, control characters, \"..\", \"@{\", and any of "
+     "~^:?*[\\ can't\nbe in it; \"git help check-ref-format\" has all rules.",
+     "'%1%' kann kein Branch heißen. Leerzeichen, Steuerzeichen, \"..\", \"@{\" und ~^:?*[\\ sind "
+     "nicht\nerlaubt; alle Regeln stehen in \"git help check-ref-format\".",
+     "'%1%' はブランチの名前にできません。空白、制御文字、\"..\"、\"@{\"、~^:?*[\\ "
+     "は使えません。\n規則の全体は \"git help check-ref-format\" にあります。"},
+    {"Nothing was deleted: '%1%' is the current branch. Switch to another one first.",
+     "Nichts wurde gelöscht: '%1%' ist der aktuelle Branch. Wechseln Sie erst zu einem anderen.",
+     "何も削除されませんでした。'%1%' "
+     "は現在のブランチです。先に別のブランチに切り替えてください。"},
+    {"There is no revision '%1%'.", "Es gibt keine Revision '%1%'.",
+     "リビジョン '%1%' はありません。"},
+    {"More than one object has an id that begins with '%1%', or the beginning is too short. Give "
+     "more of it.",
+     "Mehr als ein Objekt hat eine Id, die mit '%1%' beginnt, oder der Anfang ist zu kurz. Geben "
+     "Sie mehr davon an.",
+     "'%1%' で始まる ID のオブジェクトが複数あるか、短すぎます。もっと長く指定してください。"},
+    {"'%1%' is not a revision. \"git help revisions\" describes how one is written; a range is "
+     "none.",
+     "'%1%' ist keine Revision. Wie man eine schreibt, steht in \"git help revisions\"; ein "
+     "Bereich "
+     "ist keine.",
+     "'%1%' はリビジョンではありません。書き方は \"git help revisions\" "
+     "にあります。範囲は指定できません。"},
+    {"Nothing was pushed: the tag '%1%' is another one at %2%. To replace it there:\n%3%",
+     "Nichts wurde hochgeladen: Der Tag '%1%' ist bei %2% ein anderer. Um ihn dort zu "
+     "ersetzen:\n%3%",
+     "何も送られませんでした。%2% のタグ '%1%' は別のものです。置き換えるには:\n%3%"},
+    {"Nothing was pushed: the branch '%1%' at %2% has commits that yours does not have.\nDownload "
+     "them with \"vclink-shell fetch\", merge them, and push again. To discard them there "
+     "instead:\n%3%",
+     "Nichts wurde hochgeladen: Der Branch '%1%' bei %2% hat Commits, die Ihrer nicht hat.\nHolen "
+     "Sie sie mit \"vclink-shell fetch\", führen Sie sie zusammen, und laden Sie noch einmal "
+     "hoch.\nUm sie stattdessen dort zu verwerfen:\n%3%",
+     "何も送られませんでした。%2% のブランチ '%1%' "
+     "には、手元のブランチにないコミットがあります。\n\"vclink-shell fetch\" "
+     "で取得し、マージしてからもう一度送ってください。代わりにリモートのものを\n破棄するには:\n%"
+     "3%"},
+    {"Nothing was committed: a merge was interrupted before all of it was written, and a commit "
+     "would\nleave the rest out. To begin again, run this in the root of the working copy:\n%1%",
+     "Nichts wurde committet: Ein Merge wurde unterbrochen, bevor alles geschrieben war; einem "
+     "Commit\nwürde der Rest fehlen. Um neu zu beginnen, führen Sie dies im Wurzelordner der "
+     "Arbeitskopie aus:\n%1%",
+     "何もコミットされませんでした。マージがすべて書き込まれる前に中断され、コミットすると残りが含"
+     "ま"
+     "れません。\nやり直すには、作業コピーのルートで次を実行してください:\n%1%"},
+    {"Nothing was committed: the index has nothing of what only the other side of the merge has "
+     "changed.\nIf you put that back intentionally, run \"git commit\". To begin again, run this "
+     "in the root of the\nworking copy:\n%1%",
+     "Nichts wurde committet: Im Index fehlt, was nur die andere Seite des Merge geändert "
+     "hat.\nIst "
+     "das Absicht, benutzen Sie \"git commit\". Um neu zu beginnen, führen Sie dies im "
+     "Wurzelordner "
+     "der\nArbeitskopie aus:\n%1%",
+     "何もコミットされませんでした。マージの相手側だけが変更した内容がインデックスにありません。"
+     "\n意図したものであれば \"git commit\" "
+     "を使ってください。やり直すには、作業コピーのルートで次を実行して\nください:\n%1%"},
     {"There is no remote '%1%'.", "Es gibt kein Remote '%1%'.", "リモート '%1%' はありません。"},
     {"Add one with \"git remote add %1% ADDRESS\".",
      "Fügen Sie eines hinzu: \"git remote add %1% ADRESSE\".",
@@ -84,25 +153,24 @@ constexpr Translation failureRows[] = {
     {"There is a repository in %1%, but it can't be opened.",
      "In %1% liegt ein Repository, aber es kann nicht geöffnet werden.",
      "%1% にリポジトリがありますが、開けません。"},
-    {"%1% is a bare repository inside the working copy %2%. If it came with a clone, "
-     "its\nconfiguration did too, and may name commands that then run. If you trust it, use "
-     "--bare.",
+    {"%1% is a bare repository inside the working copy %2%. If it came with a clone, so did\nits "
+     "configuration, which can run commands. If you trust it, use --bare.",
      "%1% ist ein bloßes Repository in der Arbeitskopie %2%. Wenn es mit einem Klon kam, kam auch "
      "seine\nKonfiguration so und kann Befehle nennen, die dann laufen. Wenn Sie ihm vertrauen, "
      "benutzen Sie\n--bare.",
      "%1% は作業コピー %2% "
      "の中のベアリポジトリです。クローンと一緒に来たものなら、その設定も同様で、実行\nされるコマン"
      "ドを含むかもしれません。信頼できる場合は --bare を使ってください。"},
-    {"The server asked for a key. Keys are taken from an ssh agent only, and SSH_AUTH_SOCK names "
-     "none.\nStart one with \"eval $(ssh-agent)\", and give it the key with \"ssh-add\".",
+    {"The server asked for a key. Only an ssh agent provides keys, and SSH_AUTH_SOCK names "
+     "none.\nStart one with \"eval $(ssh-agent)\", and add the key with \"ssh-add\".",
      "Der Server verlangt einen Schlüssel. Schlüssel kommen nur von einem ssh-Agenten, und "
      "SSH_AUTH_SOCK\nnennt keinen. Starten Sie einen mit \"eval $(ssh-agent)\" und geben Sie ihm "
      "den Schlüssel mit\n\"ssh-add\".",
      "サーバーが鍵を要求しました。鍵は ssh エージェントからだけ取得しますが、SSH_AUTH_SOCK "
      "がありません。\n\"eval $(ssh-agent)\" でエージェントを起動し、\"ssh-add\" "
      "で鍵を渡してください。"},
-    {"The server asked for a key. Keys are taken from an ssh agent only, and the one "
-     "that\nSSH_AUTH_SOCK names does not answer: %1%",
+    {"The server asked for a key. Only an ssh agent provides keys, and the one that\nSSH_AUTH_SOCK "
+     "names does not answer: %1%",
      "Der Server verlangt einen Schlüssel. Schlüssel kommen nur von einem ssh-Agenten, und der, "
      "den\nSSH_AUTH_SOCK nennt, antwortet nicht: %1%",
      "サーバーが鍵を要求しました。鍵は ssh エージェントからだけ取得しますが、SSH_AUTH_SOCK "
@@ -116,8 +184,8 @@ constexpr Translation failureRows[] = {
      "ssh://NAME@HOST/PFAD.",
      "サーバーがユーザー名を要求しました。ssh://NAME@HOST/PATH "
      "のようにホストの前に付けてください。"},
-    {"The server asked for a password, and none is ever given: only an ssh agent is asked, for "
-     "keys.",
+    {"The server asked for a password. This program never sends one; it only uses the keys of an "
+     "ssh agent.",
      "Der Server verlangt ein Passwort, und es wird nie eines gesendet: Nur ein ssh-Agent wird "
      "nach\nSchlüsseln gefragt.",
      "サーバーがパスワードを要求しましたが、パスワードは送りません。ssh "
@@ -137,8 +205,8 @@ constexpr Translation failureRows[] = {
      "現在のフォルダーが見つかりません: %1%。"},
     {"Standard output can't be written: %1%.",
      "Die Standardausgabe kann nicht geschrieben werden: %1%.", "標準出力に書き込めません: %1%。"},
-    {"Nothing was heard of the operation for a while.",
-     "Von dem Vorgang war eine Weile nichts zu hören.", "しばらく処理からの応答がありません。"},
+    {"The operation makes no progress.", "Von dem Vorgang war eine Weile nichts zu hören.",
+     "しばらく処理からの応答がありません。"},
     {"The operation can't be asked to stop: %1%.",
      "Der Vorgang kann nicht gebeten werden aufzuhören: %1%.", "処理に中止を要求できません: %1%。"},
     {"This can't be cancelled. It goes on to its end.",
@@ -150,7 +218,7 @@ constexpr Translation failureRows[] = {
     {"Cancelling, as soon as the server answers.", "Wird abgebrochen, sobald der Server antwortet.",
      "サーバーが応答したらキャンセルします。"},
     {"Cancelling.", "Wird abgebrochen.", "キャンセルしています。"},
-    {"Ctrl-C ends the program at once now.", "Strg-C beendet das Programm jetzt sofort.",
+    {"The next Ctrl-C ends the program at once.", "Strg-C beendet das Programm jetzt sofort.",
      "Ctrl-C を押すと、すぐにプログラムを終了します。"},
     {"It was done before it could be cancelled.",
      "Es war erledigt, bevor es abgebrochen werden konnte.", "キャンセルする前に完了しました。"},

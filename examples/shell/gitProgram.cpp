@@ -10,6 +10,8 @@
 #include <sys/wait.h>
 #include <unistd.h>
 
+#include "texts.hpp"
+
 namespace vclink::shell
 {
 namespace
@@ -27,7 +29,8 @@ std::vector<char *> pointersTo(std::vector<std::string> &texts)
     return pointers;
 }
 
-/// Without git's own variables, which the library does not read, and the options of tar.
+/// Without git's own variables, which the library does not read, and the options of tar. Messages
+/// are asked for in the program's language.
 std::vector<std::string> environmentOfPrograms()
 {
     std::vector<std::string> variables;
@@ -35,11 +38,12 @@ std::vector<std::string> environmentOfPrograms()
     {
         const std::string_view text = *variable;
         const bool isOfGit = text.substr(0, 4) == "GIT_" && text.substr(0, 11) != "GIT_CONFIG_";
-        if (!isOfGit && text.substr(0, 12) != "TAR_OPTIONS=")
+        if (!isOfGit && text.substr(0, 12) != "TAR_OPTIONS=" && text.substr(0, 9) != "LANGUAGE=")
         {
             variables.emplace_back(text);
         }
     }
+    variables.push_back("LANGUAGE=" + currentLanguage());
     return variables;
 }
 
@@ -95,7 +99,7 @@ std::optional<std::string> runProgram(std::vector<std::string> words, const Memo
 std::vector<std::string> gitWords(const std::filesystem::path &folder,
                                   const std::vector<std::string> &arguments)
 {
-    // Nothing of the user's runs meanwhile, and no line ending is a reason to fail.
+    // No command of the user's configuration runs, and no line ending is a reason to fail.
     std::vector<std::string> words{"git",
                                    "-C",
                                    folder.string(),
@@ -118,19 +122,28 @@ std::optional<std::string> runGit(const std::filesystem::path &folder,
     return failure ? std::nullopt : std::optional(out.read());
 }
 
+std::vector<std::string> splitAtNul(const std::string &text)
+{
+    std::vector<std::string> pieces;
+    for (std::size_t start = 0; start < text.size();)
+    {
+        const std::size_t end = text.find('\0', start);
+        pieces.push_back(text.substr(start, end - start));
+        start = end == std::string::npos ? text.size() : end + 1;
+    }
+    return pieces;
+}
+
 std::map<std::string, std::string> readRemoteSettings(const std::filesystem::path &folder)
 {
     std::map<std::string, std::string> settings;
     const std::string text =
         runGit(folder, {"config", "-z", "--get-regexp", "^(branch|remote)\\."}).value_or("");
-    for (std::size_t start = 0; start < text.size();)
+    for (const std::string &entry : splitAtNul(text))
     {
-        const std::size_t end = text.find('\0', start);
-        const std::string entry = text.substr(start, end - start);
         const std::size_t line = entry.find('\n');
         settings[entry.substr(0, line)] =
             line == std::string::npos ? std::string() : entry.substr(line + 1);
-        start = end == std::string::npos ? text.size() : end + 1;
     }
     return settings;
 }

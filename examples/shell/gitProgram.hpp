@@ -14,7 +14,8 @@
 namespace vclink::shell
 {
 
-/// Runs a program, without git's own variables in its environment. Ctrl-C does not reach it.
+/// Runs a program, without git's own variables in its environment, in the program's language.
+/// Ctrl-C does not reach it.
 /// @return nothing if it has ended with status 0, otherwise what it wrote to its standard error
 std::optional<std::string> runProgram(std::vector<std::string> words, const MemoryFile &in,
                                       const MemoryFile &out);
@@ -29,6 +30,9 @@ std::vector<std::string> gitWords(const std::filesystem::path &folder,
 std::optional<std::string> runGit(const std::filesystem::path &folder,
                                   const std::vector<std::string> &arguments,
                                   std::string_view input = {});
+
+/// The pieces of an output of git, each of which has a NUL at its end.
+std::vector<std::string> splitAtNul(const std::string &text);
 
 /// Git's settings of branches and remotes, by their full names as git lists them; the last value of
 /// each.

@@ -29,8 +29,8 @@ constexpr Translation helpRows[] = {
     {"Show this help", "Diese Hilfe zeigen", "このヘルプを表示する"},
     {"Show the versions, as version does", "Die Versionen zeigen, wie version",
      "バージョンを表示する (version と同じ)"},
-    {"\"vclink-shell help COMMAND\" tells more about a command.\n\nExit status: 0 done, 1 failed, "
-     "2 wrong usage, 128 and a signal's number stopped.",
+    {"\"vclink-shell help COMMAND\" describes a command.\n\nExit status: 0 done, 1 failed, 2 wrong "
+     "usage, 128 plus a signal's number if that stopped it.",
      "\"vclink-shell help BEFEHL\" sagt mehr über einen Befehl.\n\nStatus: 0 erledigt, 1 "
      "misslungen, 2 falscher Aufruf, 128 und die Nummer eines Signals abgebrochen.",
      "\"vclink-shell help コマンド\" でコマンドの詳細を表示します。\n\n終了ステータス: 0 成功、1 "
@@ -53,12 +53,12 @@ constexpr Translation helpRows[] = {
      "Den Fortschritt langer Vorgänge auf der Fehlerausgabe zeichnen: always,\nnever oder auto "
      "(wenn sie ein Terminal ist)",
      "長い処理の進行状況を標準エラー出力に描く: always、never、\nauto (端末の場合だけ)"},
-    {"Also work in a bare repository inside a working copy, whose\nconfiguration may have come "
-     "with a clone",
-     "Auch in einem bloßen Repository innerhalb einer Arbeitskopie arbeiten,\ndessen Konfiguration "
-     "mit einem Klon gekommen sein kann",
+    {"Also work in a bare repository inside a working copy. Its configuration\nmay have come with "
+     "a clone, and can run commands",
+     "Auch in einem bloßen Repository innerhalb einer Arbeitskopie arbeiten.\nSeine Konfiguration "
+     "kann mit einem Klon gekommen sein und Befehle nennen",
      "作業コピー内のベアリポジトリでも動作する "
-     "(その設定は\nクローンと一緒に来たものかもしれません)"},
+     "(その設定は\nクローンと一緒に来て、コマンドを実行することがあります)"},
     {"Commands", "Befehle", "コマンド"},
     {"Show the help of a command", "Die Hilfe eines Befehls zeigen", "コマンドのヘルプを表示する"},
     {"The command; without it, all commands", "Der Befehl; ohne Angabe alle Befehle",
@@ -97,7 +97,7 @@ constexpr Translation helpRows[] = {
     {"Show the name of the current branch", "Den Namen des aktuellen Branch zeigen",
      "現在のブランチの名前を表示する"},
     {"Show the id of a revision", "Die Id einer Revision zeigen", "リビジョンの ID を表示する"},
-    {"Tell whether a merge or another operation is unfinished",
+    {"Show whether a merge or another operation is unfinished",
      "Sagen, ob ein Merge oder ein anderer Vorgang unvollendet ist",
      "マージなどの操作が途中かどうかを表示する"},
     {"Merge a branch into the current one", "Einen Branch in den aktuellen zusammenführen",
@@ -117,13 +117,16 @@ constexpr Translation helpRows[] = {
     {"Show or install the merge and diff tools in Git's configuration",
      "Die Merge- und Diff-Werkzeuge in der Git-Konfiguration zeigen oder eintragen",
      "Git の設定にあるマージツールと差分ツールを表示または設定する"},
-    {"Tell whether a folder is a working copy or repository that can be served",
+    {"Show whether a folder is a working copy or repository that can be served",
      "Sagen, ob ein Ordner eine nutzbare Arbeitskopie oder ein Repository ist",
      "フォルダーが扱える作業コピーまたはリポジトリかどうかを表示する"},
     {"Show the versions of this program and of libgit2",
      "Die Versionen dieses Programms und von libgit2 zeigen",
      "このプログラムと libgit2 のバージョンを表示する"},
     {"Did you mean '%1%'?", "Meinten Sie '%1%'?", "'%1%' のことですか?"},
+    {"This program does not do that, git does: use \"%1%\".",
+     "Das tut nicht dieses Programm, sondern git: Benutzen Sie \"%1%\".",
+     "このプログラムにはない機能です。git を使ってください: \"%1%\"。"},
     {"Use \"%1%\".", "Benutzen Sie \"%1%\".", "\"%1%\" を使ってください。"},
 };
 

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "indexEntries.hpp"
 
+#include <algorithm>
 #include <cctype>
 #include <cstddef>
 #include <map>
@@ -13,18 +14,6 @@ namespace
 {
 
 constexpr const char *noMode = "000000";
-
-std::vector<std::string> splitAtNul(const std::string &text)
-{
-    std::vector<std::string> pieces;
-    for (std::size_t start = 0; start < text.size();)
-    {
-        const std::size_t end = text.find('\0', start);
-        pieces.push_back(text.substr(start, end - start));
-        start = end == std::string::npos ? text.size() : end + 1;
-    }
-    return pieces;
-}
 
 std::vector<std::string> splitAtBlank(const std::string &text)
 {
@@ -54,7 +43,7 @@ std::optional<std::vector<StagedChange>> askForChanges(const std::filesystem::pa
         const std::vector<std::string> words = splitAtBlank(pieces[index]);
         if (words.size() == 5 && words[4] != "U")
         {
-            changes.push_back({pieces[index + 1], words[0].substr(1), words[1], words[3]});
+            changes.push_back({pieces[index + 1], words[0].substr(1), words[1], words[3], false});
         }
     }
     return changes;
@@ -76,7 +65,7 @@ std::optional<std::vector<StagedChange>> compareEntries(const std::filesystem::p
         const std::size_t tab = record.find('\t');
         const std::string name = record.substr(tab + 1);
         const std::vector<std::string> words = splitAtBlank(record.substr(0, tab));
-        changes[name] = {name, words.front(), noMode, words.back()};
+        changes[name] = {name, words.front(), noMode, words.back(), false};
     }
     for (const IndexEntry &entry : *entries)
     {
@@ -85,8 +74,8 @@ std::optional<std::vector<StagedChange>> compareEntries(const std::filesystem::p
             changes.erase(entry.name);
             continue;
         }
-        const auto [known, isNew] =
-            changes.try_emplace(entry.name, StagedChange{entry.name, noMode, entry.mode, entry.id});
+        const auto [known, isNew] = changes.try_emplace(
+            entry.name, StagedChange{entry.name, noMode, entry.mode, entry.id, false});
         if (isNew)
         {
             continue;
@@ -100,11 +89,31 @@ std::optional<std::vector<StagedChange>> compareEntries(const std::filesystem::p
         known->second.id = entry.id;
     }
     std::vector<StagedChange> list;
+    list.reserve(changes.size());
     for (const auto &[name, change] : changes)
     {
         list.push_back(change);
     }
     return list;
+}
+
+/// Git lists a file that is only intended to be added as one that is staged without content.
+void markIntended(const std::filesystem::path &root, std::vector<StagedChange> &changes)
+{
+    constexpr const char *emptyBlob = "e69de29bb2d1d6434b8b29ae775ad8c2e48c5391";
+    if (std::none_of(changes.begin(), changes.end(),
+                     [](const StagedChange &change) { return change.id == emptyBlob; }))
+    {
+        return;
+    }
+    const std::vector<std::string> names =
+        splitAtNul(runGit(root, {"diff-files", "--ita-invisible-in-index", "--diff-filter=A",
+                                 "--name-only", "-z"})
+                       .value_or(""));
+    for (StagedChange &change : changes)
+    {
+        change.isIntended = std::find(names.begin(), names.end(), change.name) != names.end();
+    }
 }
 
 } // namespace
@@ -119,10 +128,20 @@ bool StagedChange::isDeleted() const
     return mode == noMode;
 }
 
+bool IndexEntry::isOverlooked() const
+{
+    return isAssumedUnchanged || isSkipped;
+}
+
 std::optional<std::vector<StagedChange>> readStagedChanges(const std::filesystem::path &root)
 {
     auto changes = askForChanges(root);
-    return changes ? changes : compareEntries(root);
+    changes = changes ? changes : compareEntries(root);
+    if (changes)
+    {
+        markIntended(root, *changes);
+    }
+    return changes;
 }
 
 std::optional<std::vector<IndexEntry>> readIndex(const std::filesystem::path &root)
@@ -140,11 +159,11 @@ std::optional<std::vector<IndexEntry>> readIndex(const std::filesystem::path &ro
         const std::vector<std::string> words = splitAtBlank(record.substr(0, tab));
         if (tab != std::string::npos && words.size() == 4)
         {
-            const char tag = words[0].front();
-            const bool isOverlooked =
-                tag == 'S' || std::islower(static_cast<unsigned char>(tag)) != 0;
-            entries.push_back(
-                {record.substr(tab + 1), words[1], words[2], isOverlooked, words[3] != "0"});
+            const char letter = words[0].front();
+            // "S" is "skip worktree"; a small letter means "assume unchanged".
+            const bool isSmall = std::islower(static_cast<unsigned char>(letter)) != 0;
+            entries.push_back({record.substr(tab + 1), words[1], words[2], isSmall,
+                               letter == 'S' || letter == 's', words[3] != "0"});
         }
     }
     return entries;

@@ -6,7 +6,7 @@
 #include <string>
 #include <vector>
 
-/// What the library does not tell of the index: git does.
+/// What the library does not report about the index: git does.
 namespace vclink::shell
 {
 
@@ -20,6 +20,8 @@ struct StagedChange
     std::string mode;
     /// of what is staged
     std::string id;
+    /// whether nothing is staged yet, as after "git add -N"
+    bool isIntended = false;
 
     bool isAdded() const;
     bool isDeleted() const;
@@ -30,10 +32,13 @@ struct IndexEntry
     std::string name;
     std::string mode;
     std::string id;
-    /// whether Git was told not to look at the file: "assume unchanged", or left out of a sparse
-    /// checkout
-    bool isOverlooked = false;
+    bool isAssumedUnchanged = false;
+    /// marked "skip worktree", as what a sparse checkout leaves out
+    bool isSkipped = false;
     bool isInConflict = false;
+
+    /// Whether Git was told not to look at the file.
+    bool isOverlooked() const;
 };
 
 constexpr const char *submoduleMode = "160000";

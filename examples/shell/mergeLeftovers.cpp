@@ -3,11 +3,14 @@
 
 #include <filesystem>
 #include <memory>
+#include <set>
 #include <string>
 #include <system_error>
+#include <vector>
 
 #include "failures.hpp"
 #include "fl/i18n/convert.hpp"
+#include "gitProgram.hpp"
 #include "namedPaths.hpp"
 #include "names.hpp"
 #include "renames.hpp"
@@ -86,6 +89,14 @@ bool isSetAside(const ustring &name, const FileStateMap &states)
            isTaken(name.substr(0, mark), states);
 }
 
+std::set<std::string> changedNames(const fs::path &root, const std::string &from,
+                                   const std::string &to)
+{
+    const auto output = runGit(root, {"diff-tree", "-r", "-z", "--name-only", from, to});
+    const std::vector<std::string> names = splitAtNul(output.value_or(""));
+    return {names.begin(), names.end()};
+}
+
 bool isFolder(const fs::directory_entry &entry)
 {
     std::error_code ignored;
@@ -100,17 +111,41 @@ bool isForeign(const fs::directory_entry &entry)
 
 } // namespace
 
+FileStateMap withDriver(CMAdapter &adapter, const FileStateMap &files, const std::string &driver)
+{
+    FileStateMap found = withAttribute(adapter, files, "merge=" + driver);
+    // The driver of files without the attribute, by the setting merge.default.
+    return found.empty() ? withAttribute(adapter, files, "!merge") : found;
+}
+
+FileStateMap findChangedByBoth(CMAdapter &adapter, const std::optional<std::string> &theirs)
+{
+    FileStateMap found;
+    const fs::path root = nativePath(adapter.getRootFolder());
+    const auto bases = runGit(root, {"merge-base", "HEAD", theirs.value_or("")});
+    if (!bases)
+    {
+        return found;
+    }
+    const std::string base = bases->substr(0, bases->find('\n'));
+    const std::set<std::string> byThem = changedNames(root, base, *theirs);
+    const std::set<std::string> different = changedNames(root, "HEAD", *theirs);
+    for (const std::string &name : changedNames(root, base, "HEAD"))
+    {
+        if (byThem.count(name) != 0 && different.count(name) != 0)
+        {
+            found.emplace(makePath(root / name), FileState(FileState::Modified));
+        }
+    }
+    return found;
+}
+
 FileStateMap findRefused(CMAdapter &adapter, const FileStateMap &conflicts, const MergeNotes &notes)
 {
     FileStateMap refused;
     for (const auto &[driver, count] : notes.refusals)
     {
-        FileStateMap files = withAttribute(adapter, conflicts, "merge=" + driver);
-        if (files.empty())
-        {
-            // The driver of files without the attribute, by the setting merge.default.
-            files = withAttribute(adapter, conflicts, "!merge");
-        }
+        FileStateMap files = withDriver(adapter, conflicts, driver);
         FileStateMap likely = ofBothSides(adapter, files);
         refused.merge(likely.size() >= count ? likely : files);
     }
@@ -153,10 +188,10 @@ void tellSetAside(CMAdapter &adapter)
     const FileStateMap files = findSetAside(adapter.getRootFolder(), states);
     if (!files.empty())
     {
-        complain(
-            say("These files have another name now, because something else has theirs:%1%\nThe "
-                "merge leaves them out: move what you want to keep to its place, and add it.",
-                listNames(files)));
+        complain(say(
+            "The merge has renamed these files, because something else has their names:%1%\nThey "
+            "are not in the merge: move each that you want to keep to its place, and add it.",
+            listNames(files)));
     }
 }
 

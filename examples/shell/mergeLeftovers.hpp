@@ -1,6 +1,9 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include <optional>
+#include <string>
+
 #include "MergeLog.hpp"
 #include "vclink/CMAdapter.hpp"
 #include "vclink/FileStateMap.hpp"
@@ -13,6 +16,12 @@ namespace vclink::shell
 /// @param conflicts the files in conflict
 FileStateMap findRefused(CMAdapter &adapter, const FileStateMap &conflicts,
                          const MergeNotes &notes);
+
+/// Those of the files that a merge driver is for.
+FileStateMap withDriver(CMAdapter &adapter, const FileStateMap &files, const std::string &driver);
+
+/// The files that HEAD and the other side have changed, each in its way; none without git.
+FileStateMap findChangedByBoth(CMAdapter &adapter, const std::optional<std::string> &theirs);
 
 /// The files that have another name than in the commits, because something else has theirs;
 /// ignored ones, too.

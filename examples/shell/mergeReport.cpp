@@ -129,6 +129,12 @@ void tellRefusal(CMAdapter &adapter, const MergeNotes &notes,
         complain(say("The merge command can't be started: '%1%' is no program. Correct the setting "
                      "merge.%2%.driver: %3%",
                      word, notes.driver, notes.command));
+        const FileStateMap files =
+            withDriver(adapter, findChangedByBoth(adapter, theirs), notes.driver);
+        if (!files.empty())
+        {
+            complain(say("It merges these files:%1%", listNames(files)));
+        }
     }
 }
 

@@ -33,8 +33,8 @@ FileStateMap pick(const FileStateMap &states, const upath &path)
     return picked;
 }
 
-/// Completes what was named by the states of its own entry, which a folder has too where it stands
-/// in the place of a file, and by those below a folder that is gone.
+/// Completes what was named by the states of its own entry, which a folder has too if it is in the
+/// place of a file, and by those below a folder that is gone.
 void lookUpEntry(CMAdapter &adapter, const FileStateMap &states, NamedPath &named)
 {
     const upath &path = named.path;
@@ -66,7 +66,7 @@ NamedPath lookUpFolder(CMAdapter &adapter, const std::string &argument, const fs
     return named;
 }
 
-/// As Git knows what stands there, and what lay below it before it became a link.
+/// As Git knows what is there, and what lay below it before it became a link.
 NamedPath lookUpLink(CMAdapter &adapter, const std::string &argument, const upath &entry)
 {
     FileStateMap states = pick(folderStates(adapter, adapter.getRootFolder()), entry);
@@ -106,6 +106,7 @@ FileStateMap statesOf(CMAdapter &adapter, const std::vector<upath> &files)
 std::vector<NamedPath> lookUpFolders(CMAdapter &adapter, const std::vector<std::string> &arguments)
 {
     std::vector<NamedPath> paths;
+    paths.reserve(arguments.size());
     for (const std::string &argument : arguments)
     {
         paths.push_back(lookUpFolder(adapter, argument, resolveArgument(argument)));
@@ -117,6 +118,7 @@ std::vector<NamedPath> lookUp(CMAdapter &adapter, const std::vector<std::string>
 {
     const upath &root = adapter.getRootFolder();
     std::vector<NamedPath> paths;
+    paths.reserve(arguments.size());
     std::vector<upath> entries;
     for (const std::string &argument : arguments)
     {

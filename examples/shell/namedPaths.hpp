@@ -20,7 +20,7 @@ struct NamedPath
     std::string argument;
     /// absolute
     upath path;
-    /// Of a folder, all files below it; of a file, the file itself; nothing that Git does not know.
+    /// all files below a folder, or the file itself; nothing that Git does not know
     FileStateMap states;
     /// whether the states are those of files below a folder
     bool isFolder = false;
@@ -30,7 +30,7 @@ struct NamedPath
 
 /// What was named, with the states of all files below the folders. A folder is asked for by itself.
 /// One without files of its own may be a submodule, which is a single entry, and counts as a file.
-/// @throws ShellFailure, and what the back end raises
+/// @throws ShellFailure, and what the back end throws
 std::vector<NamedPath> lookUpFolders(CMAdapter &adapter, const std::vector<std::string> &arguments);
 
 /// As lookUpFolders(), with the states of the files too, and with paths as Git has them: a symbolic

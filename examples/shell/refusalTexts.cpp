@@ -11,27 +11,48 @@ namespace
 constexpr Translation refusalRows[] = {
     {"it lies outside the working copy %1%", "liegt außerhalb der Arbeitskopie %1%",
      "作業コピー %1% の外にあります"},
-    {"a backslash in a name is taken for a slash", "ein Backslash im Namen gilt als Schrägstrich",
+    {"a backslash in a name is read as a slash", "ein Backslash im Namen gilt als Schrägstrich",
      "名前の中のバックスラッシュはスラッシュとみなされます"},
-    {"no file of this name is known to Git", "Git kennt keine Datei dieses Namens",
+    {"Git knows no file of this name", "Git kennt keine Datei dieses Namens",
      "この名前のファイルは Git に知られていません"},
     {"there is no such file", "es gibt keine solche Datei", "そのようなファイルはありません"},
-    {"*, ? and [ in a name are taken for a pattern", "*, ? und [ in einem Namen gelten als Muster",
+    {"a name with *, ? or [ is read as a pattern", "*, ? und [ in einem Namen gelten als Muster",
      "名前の中の *、?、[ はパターンとみなされます"},
-    {"there are no files in it but ignored ones", "darin liegen nur ignorierte Dateien",
+    {"it has only ignored files", "darin liegen nur ignorierte Dateien",
      "中には無視されるファイルしかありません"},
-    {"there are no files in it", "darin liegen keine Dateien", "中にファイルがありません"},
+    {"it has no files", "darin liegen keine Dateien", "中にファイルがありません"},
     {"it is ignored by Git", "Git ignoriert die Datei", "Git に無視されます"},
     {"it is a FIFO, socket or device, which Git does not track",
      "ein FIFO, Socket oder Gerät, was Git nicht verwaltet",
      "FIFO、ソケット、デバイスのいずれかで、Git は追跡しません"},
-    {"A name with *, ? or [ is a pattern, and means these files too:%1%\nName them as well if you "
-     "mean them, or use git for the file with that name.",
+    {"A name with *, ? or [ is a pattern, and matches these files too:%1%\nName them as well if "
+     "you want them, or use git for the file with that name.",
      "Ein Name mit *, ? oder [ ist ein Muster und meint auch diese Dateien:%1%\nNennen Sie sie "
      "auch, wenn Sie sie meinen, oder benutzen Sie für die Datei dieses Namens git.",
      "*、?、[ "
      "を含む名前はパターンで、次のファイルも対象になります:%1%"
      "\n対象にするならそれらも指定し、そうでなければその名前のファイルには git を使ってください。"},
+    {"These files have lost a mark, which \"git update-index %1%\" sets again:%2%",
+     "Diese Dateien haben eine Markierung verloren, die \"git update-index %1%\" wieder setzt:%2%",
+     "次のファイルの印が失われました。\"git update-index %1%\" で付け直せます:%2%"},
+    {"%1% is a file now: move it out of the way, or revert it too",
+     "%1% ist jetzt eine Datei: Räumen Sie sie aus dem Weg, oder verwerfen Sie sie auch",
+     "%1% は今はファイルです。別の場所に移すか、一緒に元に戻してください"},
+    {"it is in conflict: edit it until it is right, then mark it with \"vclink-shell resolved\"",
+     "sie steht in Konflikt: Bearbeiten Sie sie, bis sie richtig ist, und markieren Sie sie "
+     "mit\n\"vclink-shell resolved\"",
+     "競合しています。正しく編集し、\"vclink-shell resolved\" で解決済みにしてください"},
+    {"it is gone from the disk, and from the next commit",
+     "sie ist von der Platte verschwunden und fehlt im nächsten Commit",
+     "ディスクになく、次のコミットにも含まれません"},
+    {"Git tracks it already: its changes are in the next commit anyway",
+     "Git kennt sie schon: Ihre Änderungen sind ohnehin im nächsten Commit",
+     "Git が既に追跡しています。その変更は常に次のコミットに入ります"},
+    {"Nothing can be added in their place before you commit. git can do it: use \"git add\".",
+     "An ihre Stelle kann vor einem Commit nichts hinzugefügt werden. git kann es: \"git add\".",
+     "コミットするまで、その場所には何も追加できません。git ではできます: \"git add\"。"},
+    {"It merges these files:%1%", "Er führt diese Dateien zusammen:%1%",
+     "次のファイルをマージするコマンドです:%1%"},
     {"Git tracks no file in it", "Git kennt keine Datei darin",
      "中に Git が追跡しているファイルはありません"},
     {"it is not tracked by Git", "Git kennt die Datei nicht", "Git に追跡されていません"},
@@ -41,15 +62,15 @@ constexpr Translation refusalRows[] = {
     {"it is a symbolic link, which would be followed: use \"%1%\"",
      "ein symbolischer Link, dem gefolgt würde: Benutzen Sie \"%1%\"",
      "シンボリックリンクなので、リンクがたどられてしまいます。\"%1%\" を使ってください"},
-    {"as a backslash in a name is taken for a slash:",
+    {"because a backslash in a name is read as a slash:",
      "weil ein Backslash im Namen als Schrägstrich gilt:",
      "名前の中のバックスラッシュはスラッシュとみなされます:"},
-    {"as a symbolic link would be followed:", "weil einem symbolischen Link gefolgt würde:",
+    {"because a symbolic link would be followed:", "weil einem symbolischen Link gefolgt würde:",
      "シンボリックリンクがたどられてしまいます:"},
-    {"as a submodule keeps its commit until \"git submodule update\":",
+    {"because a submodule keeps its commit until \"git submodule update\":",
      "weil ein Submodul seinen Commit bis zu \"git submodule update\" behält:",
      "サブモジュールは \"git submodule update\" までそのコミットのままです:"},
-    {"for a reason that is not known:", "aus unbekanntem Grund:", "理由は不明です:"},
+    {"for an unknown reason:", "aus unbekanntem Grund:", "理由は不明です:"},
     {"A rebase is under way. Continue it with \"git rebase --continue\", or undo it with \"git "
      "rebase --abort\".",
      "Ein Rebase läuft. Setzen Sie ihn mit \"git rebase --continue\" fort, oder nehmen Sie ihn "
@@ -77,8 +98,8 @@ constexpr Translation refusalRows[] = {
      "--continue\" oder\n\"git revert --continue\" fort, oder nehmen Sie es mit --abort zurück.",
      "連続したチェリーピックまたはリバートの途中です。\"git cherry-pick --continue\" または \"git "
      "revert --continue\" で\n続けるか、--abort で取り消してください。"},
-    {"Nothing was committed. %1%\nA commit would end it and lose the rest of it. To commit all the "
-     "same, use --as-is.",
+    {"Nothing was committed. %1%\nA commit would end it, and lose its other steps. To commit "
+     "nevertheless, use --as-is.",
      "Nichts wurde committet. %1%\nEin Commit würde das beenden und den Rest verlieren. Um "
      "trotzdem zu committen, benutzen Sie --as-is.",
      "何もコミットされませんでした。%1%"
@@ -90,12 +111,12 @@ constexpr Translation refusalRows[] = {
      "mit\n\"git merge --abort\" zurück.",
      "マージの途中です。\"vclink-shell commit\" で完了するか、\"git merge --abort\" "
      "で取り消してください。"},
-    {"Remove .git/index.lock first, unless another program is using Git here just now.",
+    {"If no other program is using Git here, remove .git/index.lock first.",
      "Entfernen Sie zuerst .git/index.lock, wenn hier nicht gerade ein anderes Programm mit Git "
      "arbeitet.",
      "ほかのプログラムがここで Git を使っていなければ、先に .git/index.lock を削除してください。"},
     {"A merge was interrupted before all of it was written, and can't be concluded. \"vclink-shell "
-     "commit\"\nsays so, and names the commands that restore the working copy.",
+     "commit\"\nprints the commands that restore the working copy.",
      "Ein Merge wurde unterbrochen, bevor alles geschrieben war, und kann nicht abgeschlossen "
      "werden.\n\"vclink-shell commit\" sagt das und nennt die Befehle, die die Arbeitskopie "
      "wiederherstellen.",
@@ -107,7 +128,7 @@ constexpr Translation refusalRows[] = {
      "nehmen Sie\nihn mit \"git cherry-pick --abort\" oder \"git revert --abort\" zurück.",
      "チェリーピックまたはリバートの途中です。\"vclink-shell commit\" で完了するか、\"git "
      "cherry-pick --abort\" または\n\"git revert --abort\" で取り消してください。"},
-    {"These files have uncommitted changes, and are others on that branch:%1%",
+    {"These files have uncommitted changes, and differ on that branch:%1%",
      "Diese Dateien haben Änderungen ohne Commit und sind auf dem Branch andere:%1%",
      "次のファイルには未コミットの変更があり、そのブランチでは内容が異なります:%1%"},
     {"These files are not tracked, and that branch has something in their place:%1%",
@@ -162,21 +183,21 @@ constexpr Translation refusalRows[] = {
      "Einstellung\nmerge.%2%.driver: %3%",
      "マージコマンドを起動できません。'%1%' はプログラムではありません。設定 merge.%2%.driver "
      "を直してください: %3%"},
-    {"These files have another name now, because something else has theirs:%1%\nThe merge leaves "
-     "them out: move what you want to keep to its place, and add it.",
+    {"The merge has renamed these files, because something else has their names:%1%\nThey are not "
+     "in the merge: move each that you want to keep to its place, and add it.",
      "Diese Dateien heißen jetzt anders, weil etwas anderes ihren Namen hat:%1%\nIm Merge fehlen "
      "sie: Bringen Sie an seinen Platz, was Sie behalten wollen, und fügen Sie es hinzu.",
      "次のファイルは、元の名前を別のものが使っているため、名前が変わっています:%1%"
      "\nマージには含まれません。残したいものは元の場所に移して追加してください。"},
-    {"Nothing was reverted, as what would be discarded can't be stored: %1%.\nTo discard it for "
-     "good, use --forget.",
+    {"Nothing was reverted, because the changes can't be stored first: %1%.\nTo discard them "
+     "without a copy, use --forget.",
      "Nichts wurde verworfen, weil nicht gespeichert werden kann, was verworfen würde: %1%.\nUm es "
      "endgültig zu verwerfen, benutzen Sie --forget.",
      "破棄する内容を保存できないため、何も元に戻されませんでした: %1%。\n完全に破棄するには "
      "--forget "
      "を使ってください。"},
-    {"Nothing was reverted, as no copy can be kept of what would be discarded:%1%\nMove it out of "
-     "the way, or discard it for good with --forget.",
+    {"Nothing was reverted, because these can't be stored first:%1%\nMove them out of the way, or "
+     "discard them without a copy with --forget.",
      "Nichts wurde verworfen, weil hiervon keine Kopie möglich ist:%1%\nRäumen Sie es aus dem Weg, "
      "oder verwerfen Sie es endgültig mit --forget.",
      "次の内容の控えを作れないため、何も元に戻されませんでした:%1%\n別の場所に移すか、--forget "
@@ -202,8 +223,8 @@ constexpr Translation refusalRows[] = {
      "が競合していて、解決するまで読み取れません。編集して、\n\"vclink-shell resolved\" "
      "で解決済みにしてください。"},
     {"The states of the files are not known: libgit2 can't read this working copy. \"git status\" "
-     "may\nsay why: a .gitmodules with an error, a setting with a value that it can't have, or "
-     "folders\nmore than 100 levels deep.",
+     "may\nsay why: an error in .gitmodules, a setting with an invalid value, or folders more than "
+     "100\nlevels deep.",
      "Die Zustände der Dateien sind nicht bekannt: libgit2 kann diese Arbeitskopie nicht lesen. "
      "\"git status\"\nkann sagen, warum: ein fehlerhaftes .gitmodules, eine Einstellung mit einem "
      "unmöglichen Wert oder\nOrdner tiefer als 100 Ebenen.",
@@ -211,7 +232,7 @@ constexpr Translation refusalRows[] = {
      "で理由がわかることが\nあります: .gitmodules の誤り、設定の不正な値、100 "
      "階層より深いフォルダーなど。"},
     {"No file here has a state: either Git ignores all files, or libgit2 can't read this working "
-     "copy.\n\"git status\" may say which: a setting with a value that it can't have, for example.",
+     "copy,\nfor example because a setting has an invalid value. \"git status\" may say which.",
      "Keine Datei hier hat einen Zustand: Entweder ignoriert Git alle Dateien, oder libgit2 kann "
      "diese\nArbeitskopie nicht lesen. \"git status\" kann sagen, was: zum Beispiel eine "
      "Einstellung mit einem\nunmöglichen Wert.",

@@ -89,11 +89,11 @@ std::string explainAbsence(const upath &root, const NamedPath &named)
     }
     if (text.find(u'\\') != ustring::npos)
     {
-        return say("a backslash in a name is taken for a slash");
+        return say("a backslash in a name is read as a slash");
     }
     if (isFollowed(named.path, root))
     {
-        return say("no file of this name is known to Git");
+        return say("Git knows no file of this name");
     }
     std::error_code ignored;
     const fs::file_status status = fs::status(path, ignored);
@@ -103,12 +103,11 @@ std::string explainAbsence(const upath &root, const NamedPath &named)
     }
     if (isPattern(relativeName(upath(text), root)))
     {
-        return say("*, ? and [ in a name are taken for a pattern");
+        return say("a name with *, ? or [ is read as a pattern");
     }
     if (fs::is_directory(status))
     {
-        return hasFiles(path) ? say("there are no files in it but ignored ones")
-                              : say("there are no files in it");
+        return hasFiles(path) ? say("it has only ignored files") : say("it has no files");
     }
     return fs::is_regular_file(status)
                ? say("it is ignored by Git")
@@ -140,8 +139,8 @@ void refuseStrays(const std::string &refusal, CMAdapter &adapter,
     {
         throw ShellFailure(
             say("%1%.", refusal) + '\n' +
-            say("A name with *, ? or [ is a pattern, and means these files too:%1%\nName them as "
-                "well if you mean them, or use git for the file with that name.",
+            say("A name with *, ? or [ is a pattern, and matches these files too:%1%\nName them as "
+                "well if you want them, or use git for the file with that name.",
                 listNames(strays)));
     }
 }
@@ -211,10 +210,10 @@ ExitStatus tellLeftOut(const std::string &refusal, const upath &root, const File
             complain(refusal + ", " + reason + listNames(files));
         }
     };
-    tell(say("as a backslash in a name is taken for a slash:"), unnamable);
-    tell(say("as a symbolic link would be followed:"), followed);
-    tell(say("as a submodule keeps its commit until \"git submodule update\":"), submodules);
-    tell(say("for a reason that is not known:"), others);
+    tell(say("because a backslash in a name is read as a slash:"), unnamable);
+    tell(say("because a symbolic link would be followed:"), followed);
+    tell(say("because a submodule keeps its commit until \"git submodule update\":"), submodules);
+    tell(say("for an unknown reason:"), others);
     return leftOut.empty() ? Done : Failed;
 }
 

@@ -137,6 +137,7 @@ std::string hexadecimal(const git::GitRemoteHead::Id &id)
 std::vector<ustring> readRefspecs(const std::vector<std::string> &refspecs)
 {
     std::vector<ustring> texts;
+    texts.reserve(refspecs.size());
     for (const std::string &refspec : refspecs)
     {
         texts.push_back(fl::i18n::utf8_to_ustring(refspec));

@@ -26,7 +26,7 @@ constexpr Translation resultRows[] = {
      "Sie\n\"git branch %1% %2%\".",
      "START にはブランチまたはタグの名前を指定してください。ほかのコミットには \"git branch %1% "
      "%2%\" を使ってください。"},
-    {"is not for a branch to delete", "gehört nicht zum Löschen eines Branch",
+    {"is not allowed with -d", "gehört nicht zum Löschen eines Branch",
      "ブランチの削除には指定できません"},
     {"%1% branch", "%1% Branch", "%1% 個のブランチ"},
     {"%1% branches", "%1% Branches", "%1% 個のブランチ"},
@@ -47,7 +47,7 @@ constexpr Translation resultRows[] = {
     {"Nothing was committed: no tracked file has changed.",
      "Nichts wurde committet: Keine Datei, die Git kennt, ist geändert.",
      "何もコミットされませんでした。追跡されているファイルに変更がありません。"},
-    {"Untracked: %1%. Add what is to be committed with \"vclink-shell add\".",
+    {"Untracked: %1%. To commit them, add them with \"vclink-shell add\".",
      "Git kennt nicht: %1%. Fügen Sie mit \"vclink-shell add\" hinzu, was in den Commit soll.",
      "追跡されていません: %1%。コミットするものを \"vclink-shell add\" で追加してください。"},
     {"Nothing was committed: the message is empty.",
@@ -86,7 +86,7 @@ constexpr Translation resultRows[] = {
     {"Removed %1% from Git, not from the disk.", "Aus Git entfernt, nicht von der Platte: %1%.",
      "Git から削除しました (ディスクには残ります): %1%。"},
     {"Not all were removed", "Nicht alle wurden entfernt", "一部は削除されませんでした"},
-    {"there are only symbolic links in it, which would be followed",
+    {"it has only symbolic links, which would be followed",
      "nur symbolische Links liegen darin, denen gefolgt würde",
      "中にはシンボリックリンクしかなく、リンク先が対象になってしまいます"},
     {"Nothing was marked as resolved", "Nichts wurde als gelöst markiert",
@@ -111,11 +111,13 @@ constexpr Translation resultRows[] = {
     {"Reverted %1%.", "Verworfen: %1%.", "元に戻しました: %1%。"},
     {"Not all were reverted", "Nicht alle wurden verworfen", "一部は元に戻されませんでした"},
     {"Not every name is known", "Nicht jeder Name ist bekannt", "知られていない名前があります"},
-    {"Nothing was switched: %1% is a tag too, whose files would be taken for the branch's.",
-     "Nichts wurde gewechselt: %1% ist auch ein Tag, dessen Dateien statt der des Branch genommen "
-     "würden.",
+    {"Nothing was switched: there is also a tag %1%, and its files would be written instead of "
+     "the\nbranch's. Rename the tag or the branch first.",
+     "Nichts wurde gewechselt: %1% ist auch ein Tag, und dessen Dateien würden geschrieben statt "
+     "der des\nBranch. Benennen Sie zuerst den Tag oder den Branch um.",
      "切り替えませんでした。%1% "
-     "はタグでもあり、ブランチではなくタグのファイルが使われてしまいます。"},
+     "はタグでもあり、ブランチではなくタグのファイルが書き出されてしまいます。\n先にタグまたはブラ"
+     "ンチの名前を変えてください。"},
     {"The current branch is %1%.", "Der aktuelle Branch ist %1%.", "現在のブランチは %1% です。"},
     {"%1% file", "%1% Datei", "%1% 個のファイル"},
     {"%1% files", "%1% Dateien", "%1% 個のファイル"},

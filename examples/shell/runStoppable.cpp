@@ -42,9 +42,10 @@ ExitStatus runStoppable(Session &session, Stops stops, const std::function<void(
         isPromised.store(stops != Stops::Never && !interactor.isWriting());
         line.clearFor([&] { remark(describeRequest(stops, isPromised.load())); });
     };
-    const auto tellGivenUp = [&line](const std::string &text) {
+    const auto tellGivenUp = [&line](const std::string &text)
+    {
         line.clearFor([&text]
-                      { complain(text + ' ' + say("Ctrl-C ends the program at once now.")); });
+                      { complain(text + ' ' + say("The next Ctrl-C ends the program at once.")); });
     };
     InterruptWatch watch(interactor.getTerminator(), interactor.activity(), tellGivenUp, tellAsked);
     const auto end = [&]

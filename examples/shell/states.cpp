@@ -11,8 +11,8 @@ namespace vclink::shell
 const std::array<StateWords, 8> stateWords{{
     {FileState::Clean, "clean", "", "tracked and unchanged"},
     {FileState::Modified, "modified", "\33[33m", "changed, staged or not"},
-    {FileState::Added, "added", "\33[32m", "new, and to be in the next commit"},
-    {FileState::Deleted, "deleted", "\33[31m", "to be gone in the next commit"},
+    {FileState::Added, "added", "\33[32m", "new, and in the next commit"},
+    {FileState::Deleted, "deleted", "\33[31m", "deleted by the next commit"},
     {FileState::Missing, "missing", "\33[1;31m", "tracked, but gone from the disk"},
     {FileState::InConflict, "conflict", "\33[1;35m", "in a conflict that is not resolved yet"},
     {FileState::Unversioned, "unversioned", "\33[36m", "not tracked"},

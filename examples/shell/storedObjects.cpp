@@ -19,12 +19,15 @@ namespace
 
 namespace fs = std::filesystem;
 
+/// Who says something is told too: it may be in another language.
 /// @throws StoreFailure
-void require(const std::optional<std::string> &failure)
+void require(const std::string &program, const std::optional<std::string> &failure)
 {
     if (failure)
     {
-        throw StoreFailure(failure->substr(0, failure->find('\n')));
+        const std::string text = failure->substr(0, failure->find('\n'));
+        const std::string begin = program + ": ";
+        throw StoreFailure(text.rfind(begin, 0) == 0 ? text : begin + text);
     }
 }
 
@@ -100,7 +103,7 @@ std::string storeDeepest(const fs::path &root, Folders &folders)
     }
     const MemoryFile in(input);
     const MemoryFile out;
-    require(runProgram(gitWords(root, {"mktree", "-z", "--missing", "--batch"}), in, out));
+    require("git", runProgram(gitWords(root, {"mktree", "-z", "--missing", "--batch"}), in, out));
     const std::vector<std::string> ids = lines(out.read());
     if (ids.size() != paths.size())
     {
@@ -146,13 +149,14 @@ std::string storeArchive(const fs::path &root, const std::vector<std::string> &n
     }
     const MemoryFile in(list);
     const MemoryFile archive;
-    require(runProgram({"tar", "--create", "--directory=" + root.string(), "--no-recursion",
+    require("tar",
+            runProgram({"tar", "--create", "--directory=" + root.string(), "--no-recursion",
                         "--hard-dereference", "--null", "--verbatim-files-from", "--files-from=-"},
                        in, archive));
     archive.rewind();
     const MemoryFile id;
-    require(
-        runProgram(gitWords(root, {"hash-object", "-w", "--no-filters", "--stdin"}), archive, id));
+    require("git", runProgram(gitWords(root, {"hash-object", "-w", "--no-filters", "--stdin"}),
+                              archive, id));
     return id.read().substr(0, 40);
 }
 

@@ -3,6 +3,8 @@
 
 #include <algorithm>
 #include <cstddef>
+#include <map>
+#include <set>
 #include <utility>
 
 #include "Command.hpp"
@@ -52,6 +54,48 @@ std::string ask(const std::string &word)
     return ' ' + say("Did you mean '%1%'?", word);
 }
 
+std::string use(const std::string &instead)
+{
+    return ' ' + say("Use \"%1%\".", instead);
+}
+
+std::string onlyGit(const std::string &command)
+{
+    return ' ' + say("This program does not do that, git does: use \"%1%\".", command);
+}
+
+/// Options that people type, and that only git has.
+const std::map<std::string, std::set<std::string>> &optionsOfGit()
+{
+    static const std::map<std::string, std::set<std::string>> options{
+        {"add", {"-e", "-f", "-i", "-N", "-n", "-p", "--dry-run", "--force", "--patch"}},
+        {"branch",
+         {"-c", "-f", "-M", "-m", "-u", "-vv", "--contains", "--edit-description", "--merged",
+          "--move", "--no-merged", "--set-upstream-to", "--unset-upstream"}},
+        {"clone",
+         {"-b", "--bare", "--branch", "--depth", "--filter", "--mirror", "--recurse-submodules",
+          "--recursive", "--shallow-since", "--single-branch", "--sparse"}},
+        {"commit",
+         {"-C", "-c", "-e", "-F", "-p", "-S", "-s", "--amend", "--author", "--date", "--dry-run",
+          "--file", "--fixup", "--gpg-sign", "--no-verify", "--patch", "--signoff", "--squash"}},
+        {"config",
+         {"-e", "-l", "--add", "--edit", "--get", "--global", "--list", "--local", "--system",
+          "--unset"}},
+        {"fetch",
+         {"-p", "-t", "--depth", "--dry-run", "--prune", "--recurse-submodules", "--tags",
+          "--unshallow"}},
+        {"merge",
+         {"-e", "-m", "-s", "-X", "--edit", "--no-commit", "--quit", "--squash", "--strategy"}},
+        {"push",
+         {"-u", "--all", "--dry-run", "--follow-tags", "--force-with-lease", "--mirror", "--prune",
+          "--set-upstream", "--tags"}},
+        {"revert", {"-e", "-m", "-n", "--abort", "--continue", "--no-commit", "--no-edit"}},
+        {"rm", {"-f", "-n", "--force"}},
+        {"status", {"-b", "-sb", "-v", "--branch", "--ignored"}},
+        {"switch", {"-C", "-d", "-f", "-m", "--detach", "--force", "--merge", "--orphan"}}};
+    return options;
+}
+
 } // namespace
 
 std::string suggest(const std::string &word, const std::vector<std::string> &known)
@@ -73,10 +117,25 @@ std::string suggest(const std::string &word, const std::vector<std::string> &kno
 std::string suggestCommand(const std::string &word)
 {
     static const std::pair<const char *, const char *> words[] = {
-        {"checkout", "switch"}, {"restore", "revert"},       {"reset", "revert"},
-        {"ls-remote", "heads"}, {"rev-parse", "rev"},        {"check-attr", "attr"},
-        {"remove", "rm"},       {"resolve", "resolved"},     {"st", "status"},
-        {"ci", "commit"},       {"symbolic-ref", "current"}, {"pull", "fetch"}};
+        {"checkout", "switch"}, {"restore", "revert"},      {"reset", "revert"},
+        {"ls-remote", "heads"}, {"rev-parse", "rev"},       {"check-attr", "attr"},
+        {"remove", "rm"},       {"resolve", "resolved"},    {"st", "status"},
+        {"ci", "commit"},       {"symbolic-ref", "current"}};
+    static const std::set<std::string> onlyGits{"am",          "apply",
+                                                "archive",     "bisect",
+                                                "blame",       "cat-file",
+                                                "cherry-pick", "clean",
+                                                "describe",    "diff",
+                                                "difftool",    "format-patch",
+                                                "gc",          "grep",
+                                                "init",        "log",
+                                                "ls-files",    "mergetool",
+                                                "mv",          "notes",
+                                                "rebase",      "reflog",
+                                                "remote",      "shortlog",
+                                                "show",        "sparse-checkout",
+                                                "stash",       "submodule",
+                                                "tag",         "worktree"};
     std::vector<std::string> names;
     for (const CommandEntry &entry : commandTable())
     {
@@ -88,6 +147,14 @@ std::string suggestCommand(const std::string &word)
         {
             return ask(ours);
         }
+    }
+    if (onlyGits.count(word) != 0)
+    {
+        return onlyGit("git " + word);
+    }
+    if (word == "pull")
+    {
+        return use("vclink-shell fetch\", \"vclink-shell merge REMOTE/BRANCH");
     }
     return suggest(word, names);
 }
@@ -123,9 +190,23 @@ std::string suggestInstead(const std::string &command, const std::string &option
                  {"merge", "--no-ff", "git config merge.ff false"},
                  {"merge", "--ff-only", "git config merge.ff only"},
                  {"switch", "-c", "vclink-shell branch NAME"},
-                 {"commit", "--amend", "git commit --amend"},
+                 {"merge", "--no-edit", "vclink-shell merge NAME"},
+                 {"add", "-u", "vclink-shell commit"},
+                 {"add", "--update", "vclink-shell commit"},
                  {"branch", "-D", "vclink-shell branch -d NAME"},
-                 {"branch", "-m", "git branch -m"},
+                 {"branch", "-a", "vclink-shell branches -r"},
+                 {"branch", "-r", "vclink-shell branches -r"},
+                 {"branch", "--list", "vclink-shell branches"},
+                 {"branch", "-v", "vclink-shell branches"},
+                 {"branch", "--show-current", "vclink-shell current"},
+                 {"push", "--delete", "vclink-shell push REMOTE :BRANCH"},
+                 {"push", "-d", "vclink-shell push REMOTE :BRANCH"},
+                 {"rm", "-r", "vclink-shell rm PATH"},
+                 {"status", "-s", "vclink-shell status"},
+                 {"status", "--short", "vclink-shell status"},
+                 {"status", "-u", "vclink-shell status"},
+                 {"status", "--porcelain", "vclink-shell status -z"},
+                 {"switch", "-", "vclink-shell switch NAME"},
                  {"push", "--force", "vclink-shell push REMOTE +BRANCH"},
                  {"push", "-f", "vclink-shell push REMOTE +BRANCH"},
                  {"fetch", "--all", "vclink-shell fetch REMOTE"},
@@ -134,10 +215,13 @@ std::string suggestInstead(const std::string &command, const std::string &option
     {
         if (command == row.command && option == row.option)
         {
-            return ' ' + say("Use \"%1%\".", row.instead);
+            return use(row.instead);
         }
     }
-    return {};
+    const auto gits = optionsOfGit().find(command);
+    return gits != optionsOfGit().end() && gits->second.count(option) != 0
+               ? onlyGit("git " + command + ' ' + option)
+               : std::string();
 }
 
 } // namespace vclink::shell

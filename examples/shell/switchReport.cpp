@@ -72,7 +72,7 @@ void tellSwitchObstacles(CMAdapter &adapter, const git::BranchManager &manager,
     }
     if (!changed.empty())
     {
-        complain(say("These files have uncommitted changes, and are others on that branch:%1%",
+        complain(say("These files have uncommitted changes, and differ on that branch:%1%",
                      listNames(changed)));
     }
     if (!untracked.empty())

@@ -20,11 +20,6 @@ std::string languageOf(const std::string &locale)
     return locale.substr(0, locale.find_first_of("_.@"));
 }
 
-std::string currentLanguage()
-{
-    return languageOf(fl::i18n::VkLocale::global().name());
-}
-
 const Translation *find(std::string_view english)
 {
     for (const TranslationTable &table : translationTables())
@@ -45,6 +40,11 @@ const Translation *find(std::string_view english)
 void setLanguage(const std::string &locale)
 {
     vclink_host::setGlobalLocale(fl::i18n::VkLocale(locale));
+}
+
+std::string currentLanguage()
+{
+    return languageOf(fl::i18n::VkLocale::global().name());
 }
 
 bool isLanguage(const std::string &locale)

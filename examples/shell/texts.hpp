@@ -20,6 +20,9 @@ struct Translation
 /// Sets the language of the program and of the library's messages, by the name of a locale.
 void setLanguage(const std::string &locale);
 
+/// The language of the process's locale, e.g. "de".
+std::string currentLanguage();
+
 /// Whether the program speaks the language of a locale.
 bool isLanguage(const std::string &locale);
 

@@ -89,10 +89,9 @@ void refuseHalfWay(CMAdapter &adapter)
     const std::string operation = describeOperation(adapter);
     if (!operation.empty())
     {
-        throw ShellFailure(
-            say("Nothing was committed. %1%\nA commit would end it and lose the rest "
-                "of it. To commit all the same, use --as-is.",
-                operation));
+        throw ShellFailure(say("Nothing was committed. %1%\nA commit would end it, and lose its "
+                               "other steps. To commit nevertheless, use --as-is.",
+                               operation));
     }
 }
 
@@ -123,10 +122,9 @@ std::string describeUnfinishedMerge(CMAdapter &adapter)
             "\"git merge --abort\".");
     }
     const std::string lock =
-        say("Remove .git/index.lock first, unless another program is using Git here just now.");
+        say("If no other program is using Git here, remove .git/index.lock first.");
     return say("A merge was interrupted before all of it was written, and can't be concluded. "
-               "\"vclink-shell commit\"\nsays so, and names the commands that restore the working "
-               "copy.") +
+               "\"vclink-shell commit\"\nprints the commands that restore the working copy.") +
            (stands(adapter, "index.lock") ? '\n' + lock : std::string());
 }
 

@@ -2,6 +2,7 @@
 #include "wayOut.hpp"
 
 #include <algorithm>
+#include <cerrno>
 #include <chrono>
 #include <filesystem>
 #include <fstream>
@@ -14,6 +15,7 @@
 
 #include "Session.hpp"
 #include "failures.hpp"
+#include "fl/i18n/convert.hpp"
 #include "names.hpp"
 #include "texts.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
@@ -109,16 +111,19 @@ void tellWayOut(Session &session)
         const int code = failure.getError().getCode();
         const bool namesSetting =
             failure.getError().getMessage().find(u"safe.directory") != ustring::npos;
-        if (code == isLocked)
+        // libgit2 has the same code for a file that the user has no right to read or write.
+        const bool isDenied =
+            fl::i18n::ustring_to_utf8(failure.getError().getMessage())
+                .find(std::generic_category().message(EACCES)) != std::string::npos;
+        if (code == isLocked && !isDenied)
         {
             tellLocks(session.adapter());
         }
         else if (code == isNoFastForward)
         {
-            complain(
-                say("Get the remote's commits with \"vclink-shell fetch\", merge them, and push "
-                    "again. To lose them there,\nput a plus before the branch: \"vclink-shell "
-                    "push REMOTE +BRANCH\"."));
+            complain(say("Download the remote's commits with \"vclink-shell fetch\", merge them, "
+                         "and push again. To discard\nthem there instead, put a plus before the "
+                         "branch: \"vclink-shell push REMOTE +BRANCH\"."));
         }
         else if (failure.getError().getMessage().find(u"unsupported ") == 0)
         {
@@ -158,10 +163,9 @@ void tellLocks(CMAdapter &adapter)
 std::string explainFormat(const fs::path &folder)
 {
     const fs::path state = hasGitEntry(folder) ? stateFolder(folder) : folder;
-    return say(
-        "%1% has the format, in core.repositoryformatversion and extensions. If git can work "
-        "here,\nuse git.",
-        showPath(makePath((sharedFolder(state) / "config").lexically_normal())));
+    return say("libgit2 does not know the format of this repository; core.repositoryformatversion "
+               "and extensions in\n%1% describe it. If git can work here, use git.",
+               showPath(makePath((sharedFolder(state) / "config").lexically_normal())));
 }
 
 std::string explainOwner(const std::string &folder)

@@ -41,7 +41,7 @@ bool hasFilesInIndex(const fs::path &root)
            std::any_of(header.begin() + 8, header.end(), [](char byte) { return byte != 0; });
 }
 
-/// Whether there is anything but folders, and what Git keeps.
+/// Whether there is anything that Git could track, and that Git does not keep.
 bool hasFilesOnDisk(const fs::path &root)
 {
     std::error_code error;
@@ -54,7 +54,8 @@ bool hasFilesOnDisk(const fs::path &root)
         {
             entry.disable_recursion_pending();
         }
-        else if (!fs::is_directory(entry->symlink_status(ignored)))
+        else if (const fs::file_status status = entry->symlink_status(ignored);
+                 fs::is_regular_file(status) || fs::is_symlink(status))
         {
             return true;
         }
@@ -79,16 +80,16 @@ std::string explainUnknownStates(CMAdapter &adapter)
             "read before it\nis resolved. Edit it, and mark it with \"vclink-shell "
             "resolved\".");
     }
-    return say("The states of the files are not known: libgit2 can't read this working copy. "
-               "\"git status\" may\nsay why: a .gitmodules with an error, a setting with a value "
-               "that it can't have, or folders\nmore than 100 levels deep.");
+    return say("The states of the files are not known: libgit2 can't read this working copy. \"git "
+               "status\" may\nsay why: an error in .gitmodules, a setting with an invalid value, "
+               "or folders more than 100\nlevels deep.");
 }
 
 std::string explainNoStates()
 {
     return say("No file here has a state: either Git ignores all files, or libgit2 can't read this "
-               "working copy.\n\"git status\" may say which: a setting with a value that it can't "
-               "have, for example.");
+               "working copy,\nfor example because a setting has an invalid value. \"git status\" "
+               "may say which.");
 }
 
 } // namespace

@@ -61,9 +61,35 @@ TEST_F(ShellAdd, RefusesFilesThatGitKnowsAndAddsNothing)
     repository_.write("new", "");
     repository_.write("b", "edited\n");
     EXPECT_EQ(refuse({"add", "new", "b", "a"}),
-              "Nothing was added, because these files are not new to Git:\n  a\n  b\n");
+              "Nothing was added:\n"
+              "  b: Git tracks it already: its changes are in the next commit anyway\n"
+              "  a: Git tracks it already: its changes are in the next commit anyway\n");
+    repository_.remove("a");
     EXPECT_EQ(runIn(repository_ / "folder", {"add", "../a"}).errors,
-              "vclink-shell: Nothing was added, because these files are not new to Git:\n  ../a\n");
+              "vclink-shell: Nothing was added:\n"
+              "  ../a: it is gone from the disk, and from the next commit\n");
+}
+
+TEST_F(ShellAdd, NamesTheWayOutOfAConflict)
+{
+    makeConflict();
+    EXPECT_EQ(refuse({"add", "a"}), "Nothing was added:\n  a: it is in conflict: edit it until it "
+                                    "is right, then mark it with \"vclink-shell resolved\"\n");
+}
+
+TEST_F(ShellAdd, NamesTheTrackedFilesThatAreInTheWayOfANewOne)
+{
+    repository_.remove("folder");
+    repository_.write("folder", "a file\n");
+    EXPECT_EQ(refuse({"add", "."}),
+              "Nothing was added, because these files are not new to Git:\n  folder/c\n  "
+              "folder/deep/d\nvclink-shell: Nothing can be added in their place before you commit. "
+              "git can do it: use \"git add\".\n");
+    repository_.git({"rm", "--quiet", "-r", "--cached", "folder"});
+    repository_.git({"-c", "user.name=Person", "-c", "user.email=person@example.org", "commit",
+                     "--quiet", "--message=gone"});
+    succeed({"add", "."});
+    EXPECT_EQ(repository_.git({"show", ":folder"}), "a file\n");
 }
 
 TEST_F(ShellAdd, TracksAgainWhatWasRemoved)
@@ -85,12 +111,9 @@ TEST_F(ShellAdd, RefusesEachNameThatItCannotServeWithTheReason)
     GitRepository(folder().path()).write("outside", "");
     EXPECT_EQ(refuse({"add", "new", "nothing", "x.ignored", "empty", "shut", "../outside",
                       ".git/config", "a/b"}),
-              "Nothing was added:\n"
-              "  nothing: there is no such file\n"
-              "  x.ignored: it is ignored by Git\n"
-              "  empty: there are no files in it\n"
-              "  shut: there are no files in it but ignored ones\n"
-              "  ../outside: it lies outside the working copy " +
+              "Nothing was added:\n  nothing: there is no such file\n  x.ignored: it is ignored by "
+              "Git\n  empty: it has no files\n  shut: it has only ignored files\n  ../outside: it "
+              "lies outside the working copy " +
                   repository_.path().string() +
                   "\n"
                   "  .git/config: it is ignored by Git\n"
@@ -109,7 +132,7 @@ TEST_F(ShellAdd, SaysThatABackslashCannotBeNamed)
     repository_.write("back\\slash", "");
     EXPECT_EQ(
         refuse({"add", "back\\slash"}),
-        "Nothing was added:\n  \"back\\\\slash\": a backslash in a name is taken for a slash\n");
+        "Nothing was added:\n  \"back\\\\slash\": a backslash in a name is read as a slash\n");
 }
 
 TEST_F(ShellAdd, StagesALinkItselfWhereItHasNoTarget)
@@ -124,11 +147,11 @@ TEST_F(ShellAdd, RefusesANameThatMeansFilesThatWereNotNamed)
     for (const std::string name : {"a[1].txt", "a1.txt", "x[1]/y", "x1/y"})
         repository_.write(name, "");
     const std::string reason =
-        "Nothing was added.\nA name with *, ? or [ is a pattern, and means these files too:\n  ";
+        "Nothing was added.\nA name with *, ? or [ is a pattern, and matches these files too:\n  ";
     const std::string way =
-        "\nName them as well if you mean them, or use git for the file with that name.\n";
+        "\nName them as well if you want them, or use git for the file with that name.\n";
     EXPECT_EQ(refuse({"add", "a[1].txt"}), reason + "a1.txt" + way);
-    EXPECT_THAT(refuse({"add", "x[1]"}), HasSubstr("  x[1]: *, ? and [ in a name are taken"));
+    EXPECT_THAT(refuse({"add", "x[1]"}), HasSubstr("  x[1]: a name with *, ? or [ is read"));
     succeed({"add", "a[1].txt", "a1.txt", "x1"});
     EXPECT_EQ(letters().at("a[1].txt"), "A ");
     EXPECT_EQ(letters().at("x1/y"), "A ");

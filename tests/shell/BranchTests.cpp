@@ -130,7 +130,10 @@ TEST_F(ShellBranches, AreDeletedMergedOrNot)
 {
     makeBranch("other", {{"a", "theirs\n"}});
     repository_.git({"branch", "same"});
-    succeed({"branch", "-d", "other"});
+    const std::string tip = idOf("other");
+    const CommandResult result = run({"branch", "-d", "other"});
+    EXPECT_EQ(result.exitStatus, 0);
+    EXPECT_EQ(result.errors, "Deleted the branch other, which was at " + tip + ".\n");
     succeed({"branch", "same", "-d"});
     EXPECT_THAT(refs("heads"), ElementsAre("main"));
 }
@@ -145,14 +148,10 @@ TEST_F(ShellBranches, AreNotMadeOrDeletedWhereThatCannotBe)
         std::vector<std::string> arguments;
         std::string reason;
     } cases[] = {
-        {{"branch", "topic", "main"}, "a reference with that name already exists"},
         {{"branch", "new", head()}, "no reference found for shorthand"},
         {{"branch", "new", "main~0"},
          "\nvclink-shell: START must be the name of a branch or a tag. For any other commit, use "
          "\"git branch new main~0\".\n"},
-        {{"branch", "two words", "main"}, "not valid"},
-        {{"branch", "topic/below", "main"}, "topic"},
-        {{"branch", "-d", "main"}, "it is the current HEAD"},
     };
     for (const auto &[arguments, reason] : cases)
     {
@@ -160,6 +159,33 @@ TEST_F(ShellBranches, AreNotMadeOrDeletedWhereThatCannotBe)
         EXPECT_THAT(errors, StartsWith(text));
         EXPECT_THAT(errors, HasSubstr(reason));
     }
+}
+
+TEST_F(ShellBranches, AreRefusedWithTheReasonAndTheWayOut)
+{
+    repository_.git({"branch", "topic"});
+    repository_.git({"branch", "group/one"});
+    const std::string cannot = "' can't be the name of a branch. Blanks, control characters, ";
+    const struct
+    {
+        std::vector<std::string> arguments;
+        std::string reason;
+    } cases[] = {
+        {{"branch", "topic", "main"},
+         "There is a branch 'topic' already. Choose another name, or use the branch that is "
+         "there:\n\"vclink-shell switch topic\".\n"},
+        {{"branch", "topic/below"},
+         "Git can't have the branches 'topic/below' and 'topic' at a time, as one is like a folder "
+         "of the other.\nChoose another name.\n"},
+        {{"branch", "group"}, "Git can't have the branches 'group' and 'group/one' at a time"},
+        {{"branch", "two words", "main"}, "'two words" + cannot},
+        {{"branch", "HEAD"}, "'HEAD" + cannot},
+        {{"branch", "--", "-x"}, "'-x" + cannot},
+        {{"branch", "-d", "main"},
+         "Nothing was deleted: 'main' is the current branch. Switch to another one first.\n"},
+    };
+    for (const auto &[arguments, reason] : cases)
+        EXPECT_THAT(refuse(arguments), StartsWith(reason));
 }
 
 TEST_F(ShellBranches, AreNotThereUnderAnotherName)
@@ -177,7 +203,7 @@ TEST_F(ShellBranches, AreNotThereUnderAnotherName)
 TEST_F(ShellBranches, TellTheirFailuresInTheLanguageThatWasAskedFor)
 {
     EXPECT_THAT(refuse({"--lang", "de", "branch", "-d", "main"}),
-                StartsWith("Git konnte den Vorgang nicht abschließen: "));
+                StartsWith("Nichts wurde gelöscht: 'main' ist der aktuelle Branch. "));
 }
 
 } // namespace

@@ -154,8 +154,8 @@ class ShellChangeOfNamesWithBackslash : public ChangeFixture
         EXPECT_EQ(result.output, "");
         return result.errors;
     }
-    const std::string leftOut_ = ", as a backslash in a name is taken for a slash:\n"
-                                 "  \"folder\\\\c\"\n  \"other\\\\file\"\n";
+    const std::string leftOut_ = ", because a backslash in a name is read as a slash:\n  "
+                                 "\"folder\\\\c\"\n  \"other\\\\file\"\n";
 };
 
 TEST_F(ShellChangeOfNamesWithBackslash, TellsThatTheyWereNotAdded)

@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: MIT
 #include <gmock/gmock.h>
+#include <sys/stat.h>
 #include <unistd.h>
 
 #include "ChangeFixture.hpp"
@@ -116,8 +117,8 @@ TEST_F(ShellCommit, IsRefusedWithoutAMessageOrAChange)
               "Nothing was committed: no tracked file has changed.\n");
     repository_.write("new", "");
     EXPECT_EQ(refuse({"commit", "-m", "Work"}),
-              "Nothing was committed: no tracked file has changed.\n"
-              "Untracked: 1 file. Add what is to be committed with \"vclink-shell add\".\n");
+              "Nothing was committed: no tracked file has changed.\nUntracked: 1 file. To commit "
+              "them, add them with \"vclink-shell add\".\n");
     repository_.write("a", "edited\n");
     for (const std::string text : {"", " \n\t"})
         EXPECT_EQ(refuse({"commit", "-m", text}), "Nothing was committed: the message is empty.\n");
@@ -125,6 +126,25 @@ TEST_F(ShellCommit, IsRefusedWithoutAMessageOrAChange)
     EXPECT_THAT(refuse({"commit", "-am", "Work"}), HasSubstr("no tracked file"));
     succeed({"commit", "--allow-empty", "-am", "[Work]"});
     EXPECT_EQ(message(), "[Work]");
+}
+
+TEST_F(ShellCommit, IsDoneIfNothingIsLeftThatHasAState)
+{
+    setIdentity();
+    for (const std::string name : {"a", "b", "folder", ".gitignore", "x.ignored"})
+        repository_.remove(name);
+    ASSERT_EQ(::mkfifo((repository_ / "fifo").c_str(), 0600), 0);
+    succeed({"commit", "-m", "Without files"});
+    EXPECT_EQ(repository_.git({"ls-tree", "HEAD"}), "");
+    succeed({"status"});
+    repository_.write("kept", "kept\n");
+    repository_.add({"kept"});
+    repository_.commitAll("kept");
+    repository_.write(".git/info/exclude", "ignored\n");
+    repository_.write("ignored", "");
+    repository_.remove("kept");
+    succeed({"commit", "-m", "Ignored files only"});
+    EXPECT_EQ(message(), "Ignored files only");
 }
 
 TEST_F(ShellCommit, ConcludesAMergeThatChangesNothing)

@@ -92,13 +92,16 @@ TEST_F(ShellFailures, SayWhyARepositoryCannotBeOpened)
 {
     const GitRepository repository = makeRepository();
     repository.git({"config", "core.repositoryFormatVersion", "9"});
-    EXPECT_THAT(runIn(repository.path(), {"status"}).errors,
-                AllOf(HasSubstr("unsupported repository version"),
-                      HasSubstr(": .git/config has the format, in core.repositoryformatversion")));
+    EXPECT_THAT(
+        runIn(repository.path(), {"status"}).errors,
+        AllOf(
+            HasSubstr("unsupported repository version"),
+            HasSubstr("libgit2 does not know the format of this repository; "
+                      "core.repositoryformatversion and extensions in\n.git/config describe it.")));
     repository.write(".git/config",
                      "[core]\nrepositoryformatversion = 1\n[extensions]\nstrange = true\n");
     EXPECT_THAT(runIn(repository.path(), {"status"}).errors,
-                AllOf(HasSubstr("unsupported extension"), HasSubstr(".git/config has the format")));
+                AllOf(HasSubstr("unsupported extension"), HasSubstr(".git/config describe it.")));
 }
 
 TEST_F(ShellFailures, SayHowARepositoryOfAnotherUserIsTrusted)
@@ -113,6 +116,24 @@ TEST_F(ShellFailures, SayHowARepositoryOfAnotherUserIsTrusted)
         repository.path().string() + '\n';
     EXPECT_EQ(result.errors.find(way) != std::string::npos, runsAsRoot()) << result.errors;
     EXPECT_EQ(result.exitStatus, runsAsRoot() ? 1 : 0);
+}
+
+TEST_F(ShellFailures, NameNoOtherProgramWhereAFileMayNotBeRead)
+{
+    GitRepository repository = makeRepository();
+    repository.write("file", "text\n");
+    repository.commitAll("begin");
+    repository.write("file", "edited\n");
+    repository.git({"config", "user.name", "Person"});
+    repository.git({"config", "user.email", "person@example.org"});
+    repository.setMode("file", 0200);
+    giveToUnprivilegedUser(repository.path());
+    const std::string errors = runAsUnprivilegedUser(
+        [&] {
+            return runIn(repository.path(), {"commit", "-m", "Work"}).errors;
+        });
+    EXPECT_THAT(errors, HasSubstr("file' is locked: Permission denied"));
+    EXPECT_THAT(errors, Not(HasSubstr("Try again")));
 }
 
 TEST_F(ShellFailures, NameTheLockThatWasLeftAndItsAge)

@@ -203,7 +203,7 @@ TEST_F(InterruptWatch, RestoresTheDefaultWhenNothingWasHeardForThreeSeconds)
             EXPECT_EQ(handlerThen_, SIG_DFL);
             EXPECT_EQ(handlerOf(SIGTERM), SIG_DFL);
             EXPECT_EQ(handlerOf(SIGHUP), SIG_IGN);
-            EXPECT_EQ(reason_, "Nothing was heard of the operation for a while.");
+            EXPECT_EQ(reason_, "The operation makes no progress.");
         });
     EXPECT_EQ(handlerOfInterrupt(), otherHandler);
 }

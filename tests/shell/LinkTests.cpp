@@ -144,9 +144,9 @@ TEST_F(ShellChangeOfLinks, TellsOfALinkThatCannotBeNamed)
     repository_.commitAll("odd");
     lead("s*r", "b");
     repository_.write("folder/c", "edited\n");
-    EXPECT_EQ(fail({"revert", "--forget", "."}),
-              "vclink-shell: Not all were reverted, as a symbolic link would be followed:\n"
-              "  s*r\n");
+    EXPECT_EQ(
+        fail({"revert", "--forget", "."}),
+        "vclink-shell: Not all were reverted, because a symbolic link would be followed:\n  s*r\n");
     EXPECT_THAT(letters(), ElementsAre(Pair("s*r", " M")));
 }
 
@@ -158,7 +158,7 @@ TEST_F(ShellChangeOfLinks, RevertsNothingThatIsNotTracked)
               "Nothing was reverted:\n  new: it is not tracked by Git\n");
     repository_.symlink("folder", "door");
     EXPECT_EQ(refuse({"revert", "door/c"}),
-              "Nothing was reverted:\n  door/c: no file of this name is known to Git\n");
+              "Nothing was reverted:\n  door/c: Git knows no file of this name\n");
 }
 
 TEST_F(ShellChangeOfLinks, RemovesNoneThatLeadsSomewhere)
@@ -167,8 +167,8 @@ TEST_F(ShellChangeOfLinks, RemovesNoneThatLeadsSomewhere)
                                "--cached\"\n";
     EXPECT_EQ(refuse({"rm", "b", "link"}), "Nothing was removed:\n  link: " + reason);
     repository_.git({"rm", "--quiet", "--cached", "p/x"});
-    EXPECT_EQ(refuse({"rm", "p"}), "Nothing was removed:\n  p: there are only symbolic links in "
-                                   "it, which would be followed\n");
+    EXPECT_EQ(refuse({"rm", "p"}),
+              "Nothing was removed:\n  p: it has only symbolic links, which would be followed\n");
     succeed({"rm", "astray"});
     EXPECT_EQ(letters().count("astray"), 1U);
 }
@@ -176,9 +176,8 @@ TEST_F(ShellChangeOfLinks, RemovesNoneThatLeadsSomewhere)
 TEST_F(ShellChangeOfLinks, RemovesOnlyTheFilesBesideThem)
 {
     repository_.symlink("../a", "p/new");
-    EXPECT_EQ(fail({"rm", "p"}),
-              "vclink-shell: Not all were removed, as a symbolic link would be followed:\n"
-              "  p/link\n");
+    EXPECT_EQ(fail({"rm", "p"}), "vclink-shell: Not all were removed, because a symbolic link "
+                                 "would be followed:\n  p/link\n");
     EXPECT_THAT(split(repository_.git({"ls-files", "-z"}), '\0'),
                 ElementsAre(".gitignore", "a", "astray", "b", "folder/c", "folder/deep/d", "link",
                             "p/link"));
@@ -192,9 +191,8 @@ TEST_F(ShellChangeOfLinks, AddsNoneThatLeadsSomewhere)
     EXPECT_EQ(refuse({"add", "file", "new"}),
               "Nothing was added:\n  new: it is a symbolic link, which would be followed: use "
               "\"git add\"\n");
-    EXPECT_EQ(fail({"add", "."}),
-              "vclink-shell: Others were not added, as a symbolic link would be followed:\n"
-              "  new\n  other\n");
+    EXPECT_EQ(fail({"add", "."}), "vclink-shell: Others were not added, because a symbolic link "
+                                  "would be followed:\n  new\n  other\n");
     EXPECT_THAT(letters(), ElementsAre(Pair("file", "A "), Pair("new", "??"), Pair("other", "??")));
 }
 
@@ -235,9 +233,8 @@ TEST_F(ShellChangeOfLinks, MarksTheFilesBesideALinkAndTellsOfTheLink)
     const TerminalResult result = runOnTerminal(
         {"env", "TERM=dumb", VCLINK_SHELL, "-C", repository_.path().string(), "resolved", "."});
     EXPECT_EQ(result.exitStatus, 1);
-    EXPECT_EQ(result.text,
-              "Marked 1 file as resolved.\nvclink-shell: Not all were marked as resolved, as a "
-              "symbolic link would be followed:\n  link\n");
+    EXPECT_EQ(result.text, "Marked 1 file as resolved.\nvclink-shell: Not all were marked as "
+                           "resolved, because a symbolic link would be followed:\n  link\n");
     EXPECT_EQ(letters().at("link"), "UU");
     EXPECT_EQ(letters().at("z"), "M ");
 }

@@ -16,12 +16,13 @@ using testing::AllOf;
 using testing::EndsWith;
 using testing::HasSubstr;
 using testing::Not;
+using testing::StartsWith;
 
 const std::string refusedBegin =
     "\nvclink-shell: A merge command refused these files. They may be a mix of both sides without "
     "conflict markers:";
-const std::string asideBegin = "\nvclink-shell: These files have another name now, because "
-                               "something else has theirs:\n";
+const std::string asideBegin =
+    "\nvclink-shell: The merge has renamed these files, because something else has their names:\n";
 
 /// What a merge with conflicts leaves, beside the files in conflict.
 class ShellMergeLeftovers : public ShellMergeFixture
@@ -79,9 +80,8 @@ TEST_F(ShellMergeLeftovers, TellWhichFilesHaveAnotherName)
     makeBranch("other", {{"new/inside", "theirs\n"}});
     commitFiles({{"new", "ours\n"}});
     EXPECT_THAT(fail({"merge", "other"}),
-                EndsWith(asideBegin +
-                         "  new~HEAD\nThe merge leaves them out: move what you want to "
-                         "keep to its place, and add it.\n"));
+                EndsWith(asideBegin + "  new~HEAD\nThey are not in the merge: move each that you "
+                                      "want to keep to its place, and add it.\n"));
     EXPECT_EQ(repository_.read("new~HEAD"), "ours\n");
 }
 
@@ -149,8 +149,7 @@ class ShellInterruptedMerge : public ShellMergeFixture
 
     const std::string recognised_ =
         "vclink-shell: A merge was interrupted before all of it was written, and can't be "
-        "concluded. \"vclink-shell commit\"\nsays so, and names the commands that restore the "
-        "working copy.";
+        "concluded. \"vclink-shell commit\"\nprints the commands that restore the working copy.";
 };
 
 TEST_F(ShellInterruptedMerge, IsRecognised)
@@ -165,8 +164,8 @@ TEST_F(ShellInterruptedMerge, IsRecognised)
 TEST_F(ShellInterruptedMerge, NamesTheLockThatItHasLeft)
 {
     fs::rename(folder() / "lock", repository_ / ".git/index.lock");
-    const std::string withLock = recognised_ + "\nRemove .git/index.lock first, unless another "
-                                               "program is using Git here just now.\n";
+    const std::string withLock =
+        recognised_ + "\nIf no other program is using Git here, remove .git/index.lock first.\n";
     EXPECT_EQ(run({"state"}).errors, withLock);
     EXPECT_THAT(fail({"merge", "other"}), EndsWith('\n' + withLock));
 }
@@ -192,8 +191,15 @@ TEST_F(ShellInterruptedMerge, CannotBeConcludedAndTellsTheWayOut)
     for (const std::vector<std::string> &commit :
          {std::vector<std::string>{"commit", "-m", "Merge"},
           std::vector<std::string>{"commit", "--as-is", "-m", "Merge"}})
-        EXPECT_THAT(fail(commit), AllOf(HasSubstr(" was interrupted before all of it was written"),
-                                        HasSubstr("git merge --abort")));
+        EXPECT_THAT(
+            fail(commit),
+            AllOf(StartsWith("vclink-shell: Nothing was committed: a merge was interrupted "
+                             "before all of it was written, and a commit would\nleave the "
+                             "rest out. To begin again, run this in the root of the working "
+                             "copy:\ngit diff-tree "),
+                  EndsWith("git merge --abort\n")));
+    EXPECT_THAT(fail({"--lang", "de", "commit", "-m", "Merge"}),
+                StartsWith("vclink-shell: Nichts wurde committet: Ein Merge wurde unterbrochen"));
     EXPECT_EQ(head(), before);
 }
 

@@ -28,7 +28,7 @@ class ShellMerge : public ShellMergeFixture
         twin.tryGit({"merge", "--no-edit", "other"});
         std::vector<std::string> arguments{"merge"};
         arguments.insert(arguments.end(), options.begin(), options.end());
-        arguments.push_back("other");
+        arguments.emplace_back("other");
         const CommandResult result = run(arguments);
         EXPECT_EQ(result.exitStatus, 0) << result.errors;
         EXPECT_EQ(result.errors, "");

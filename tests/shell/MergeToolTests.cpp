@@ -91,7 +91,8 @@ TEST_F(ShellMergeTool, FailsTheMergeWhenItCannotBeStarted)
     EXPECT_THAT(errors, Not(HasSubstr("in conflict")));
     EXPECT_THAT(errors, HasSubstr("\nvclink-shell: The merge command can't be started: "
                                   "'/nowhere/tool' is no program. Correct the setting "
-                                  "merge.vkAutoMerge.driver: /nowhere/tool %O %A %B\n"));
+                                  "merge.vkAutoMerge.driver: /nowhere/tool %O %A %B\n"
+                                  "vclink-shell: It merges these files:\n  text\n"));
     EXPECT_EQ(head(), before);
     EXPECT_EQ(state(), "Normal\n");
     EXPECT_TRUE(std::filesystem::is_empty(environment().temporary()));

@@ -72,12 +72,38 @@ TEST_F(ShellPush, MakesAndDeletesBranchesAndTags)
 TEST_F(ShellPush, LosesNoCommitsOfOthersUnlessToldTo)
 {
     overtake();
-    EXPECT_THAT(
-        refuse({"push", "origin", "refs/heads/main"}),
-        HasSubstr("contains commits that are not present locally. (code -11, category "
-                  "4)\nvclink-shell: Get the remote's commits with \"vclink-shell fetch\""));
+    const auto reason = [](const std::string &forced)
+    {
+        return "Nothing was pushed: the branch 'main' at origin has commits that yours does not "
+               "have.\nDownload them with \"vclink-shell fetch\", merge them, and push again. To "
+               "discard them there instead:\nvclink-shell push origin +" +
+               forced + '\n';
+    };
+    repository_.git({"branch", "topic"});
+    EXPECT_EQ(refuse({"push"}), reason("main"));
+    EXPECT_EQ(refuse({"push", "origin", "topic", "topic:main"}), reason("topic:main"));
+    EXPECT_EQ(served("refs/heads/topic"), "");
+    repository_.git({"fetch", "--quiet"});
+    EXPECT_EQ(refuse({"push"}), reason("main"));
+    repository_.git({"config", "remote.origin.push", "refs/heads/main"});
+    EXPECT_THAT(refuse({"push"}),
+                HasSubstr("Download the remote's commits with \"vclink-shell fetch\""));
     succeed({"push", "origin", "+refs/heads/main"});
     EXPECT_EQ(served("refs/heads/main"), commit_);
+}
+
+TEST_F(ShellPush, ReplacesNoTagUnlessToldTo)
+{
+    repository_.git({"tag", "v1", "main~1"});
+    succeed({"push", "origin", "v1"});
+    repository_.git({"checkout", "--quiet", "--orphan", "unrelated"});
+    repository_.commitAll("unrelated");
+    repository_.git({"tag", "--force", "v1"});
+    EXPECT_EQ(refuse({"push", "origin", "v1"}),
+              "Nothing was pushed: the tag 'v1' is another one at origin. To replace it there:\n"
+              "vclink-shell push origin +v1\n");
+    succeed({"push", "origin", "+v1"});
+    EXPECT_EQ(served("refs/tags/v1"), repository_.line({"rev-parse", "v1"}));
 }
 
 TEST_F(ShellPush, NamesWhatTheServerRejectsAndPushesTheRest)
@@ -188,6 +214,9 @@ TEST_F(ShellPush, RefusesWhatNamesNoCommit)
     EXPECT_EQ(refuse({"push", "origin", "mian"}),
               "Nothing was pushed: there is no branch and no tag "
               "'mian' here. Did you mean 'main'?\n");
+    EXPECT_EQ(refuse({"push", "origin", "main~1:new"}),
+              "Nothing was pushed: there is no branch and no tag 'main~1' here. Did you mean "
+              "'main'?\n");
     EXPECT_EQ(refuse({"push", "nobody", "refs/heads/main"}), "There is no remote 'nobody'.\n");
 }
 

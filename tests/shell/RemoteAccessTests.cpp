@@ -91,21 +91,18 @@ TEST_F(ShellSshAccess, IsGivenToTheKeyOfAnAgent)
 
 TEST_F(ShellSshAccess, SaysHowToStartAnAgentWhereThereIsNone)
 {
-    EXPECT_EQ(
-        refuse(url_),
-        "vclink-shell: The server asked for a key. Keys are taken from an ssh agent only, and "
-        "SSH_AUTH_SOCK names none.\nStart one with \"eval $(ssh-agent)\", and give it the key "
-        "with \"ssh-add\".\n");
+    EXPECT_EQ(refuse(url_), "vclink-shell: The server asked for a key. Only an ssh agent provides "
+                            "keys, and SSH_AUTH_SOCK names none.\nStart one with \"eval "
+                            "$(ssh-agent)\", and add the key with \"ssh-add\".\n");
 }
 
 TEST_F(ShellSshAccess, SaysThatTheAgentDoesNotAnswer)
 {
     const std::string socket = folder() / "socket";
-    EXPECT_EQ(
-        refuse(url_, socket),
-        "vclink-shell: The server asked for a key. Keys are taken from an ssh agent only, and "
-        "the one that\nSSH_AUTH_SOCK names does not answer: " +
-            socket + "\n");
+    EXPECT_EQ(refuse(url_, socket),
+              "vclink-shell: The server asked for a key. Only an ssh agent provides keys, and the "
+              "one that\nSSH_AUTH_SOCK names does not answer: " +
+                  socket + "\n");
     EXPECT_THAT(refuse(url_, "/" + std::string(200, 'x')), HasSubstr("does not answer"));
 }
 
@@ -131,8 +128,8 @@ TEST_F(ShellSshAccess, SaysThatNoPasswordIsGiven)
 {
     SshServer other(SshServer::Offers::Passwords);
     EXPECT_EQ(refuse(other.url(other.makeRepository())),
-              "vclink-shell: The server asked for a password, and none is ever given: only an ssh "
-              "agent is asked, for keys.\n");
+              "vclink-shell: The server asked for a password. This program never sends one; it "
+              "only uses the keys of an ssh agent.\n");
 }
 
 TEST_F(ShellSshAccess, SaysNothingOfKeysWhereOneWasAccepted)
@@ -154,7 +151,7 @@ TEST_F(ShellSshAccess, IsExplainedForWhatIsConfiguredToo)
                                          .environment("LSAN_OPTIONS", leakOptions)
                                          .run();
         EXPECT_EQ(result.exitStatus, 1);
-        EXPECT_THAT(result.errors, EndsWith("and give it the key with \"ssh-add\".\n"));
+        EXPECT_THAT(result.errors, EndsWith("and add the key with \"ssh-add\".\n"));
     }
 }
 
@@ -170,8 +167,8 @@ class ShellPasswordAccess : public AccessTest<WebServer>
 TEST_F(ShellPasswordAccess, IsRefusedWithoutAQuestion)
 {
     EXPECT_EQ(refuse(server().url(server().makeRepository())),
-              "vclink-shell: The server asked for a password, and none is ever given: only an ssh "
-              "agent is asked, for keys.\n");
+              "vclink-shell: The server asked for a password. This program never sends one; it "
+              "only uses the keys of an ssh agent.\n");
 }
 
 TEST_F(ShellPasswordAccess, IsNoMatterWhereNobodyAsks)

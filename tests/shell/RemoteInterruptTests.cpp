@@ -180,8 +180,8 @@ TEST_F(ShellSilentServer, IsGivenUpByASecondCtrlCAfterThreeSecondsAndLeftByAThir
     // The three seconds, and what a busy machine needs to hear of the first.
     std::this_thread::sleep_for(std::chrono::seconds(5));
     process.interrupt();
-    process.readUntil("vclink-shell: Nothing was heard of the operation for a while. Ctrl-C ends "
-                      "the program at once now.\n");
+    process.readUntil("vclink-shell: The operation makes no progress. The next Ctrl-C ends the "
+                      "program at once.\n");
     process.interrupt();
     process.readAll();
     const int status = process.wait();

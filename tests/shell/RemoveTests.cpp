@@ -63,6 +63,15 @@ TEST_F(ShellRemove, PassesOverFilesThatAreRemovedAlready)
     EXPECT_EQ(refuse({"rm", "a"}), noneToRemove);
 }
 
+TEST_F(ShellRemove, TakesRenamedFilesByBothTheirNamesAndBelowAFolder)
+{
+    repository_.git({"mv", "a", "renamed"});
+    repository_.git({"mv", "folder/c", "folder/e"});
+    succeed({"rm", "a", "renamed", "b", "folder"});
+    EXPECT_EQ(repository_.git({"ls-files"}), ".gitignore\n");
+    EXPECT_EQ(repository_.read("renamed") + repository_.read("folder/e"), "a\nfolder/c\n");
+}
+
 TEST_F(ShellRemove, SaysThatAllBelowAFolderIsRemovedAlready)
 {
     succeed({"rm", "folder"});
@@ -96,9 +105,9 @@ TEST_F(ShellRemove, RefusesANameThatMeansFilesThatWereNotNamed)
     repository_.write("*", "");
     repository_.commitAll("pattern");
     EXPECT_EQ(refuse({"rm", "*"}),
-              "Nothing was removed.\nA name with *, ? or [ is a pattern, and means these files "
-              "too:\n  .gitignore\n  a\n  b\n  folder/c\n  folder/deep/d\n"
-              "Name them as well if you mean them, or use git for the file with that name.\n");
+              "Nothing was removed.\nA name with *, ? or [ is a pattern, and matches these files "
+              "too:\n  .gitignore\n  a\n  b\n  folder/c\n  folder/deep/d\nName them as well if you "
+              "want them, or use git for the file with that name.\n");
 }
 
 TEST_F(ShellRemove, TakesASubmoduleAsOneEntry)

@@ -262,11 +262,10 @@ TEST_F(ShellRevert, DiscardsNoRepositoryInThePlaceOfAFile)
     repository_.write("b", "edited\n");
     const GitRepository inner = makeRepository("repository/a/inner");
     inner.write("work", "");
-    EXPECT_EQ(
-        runIn(repository_ / "folder", {"revert", "../a", "../b"}).errors,
-        "vclink-shell: Nothing was reverted, as no copy can be kept of what would be "
-        "discarded:\n  ../a: a repository is in its place\nMove it out of the way, or discard "
-        "it for good with --forget.\n");
+    EXPECT_EQ(runIn(repository_ / "folder", {"revert", "../a", "../b"}).errors,
+              "vclink-shell: Nothing was reverted, because these can't be stored first:\n  ../a: a "
+              "repository is in its place\nMove them out of the way, or discard them without a "
+              "copy with --forget.\n");
     EXPECT_EQ(repository_.read("b") + inner.read("work"), "edited\n");
 }
 
@@ -293,8 +292,8 @@ TEST_F(ShellRevert, DiscardsNothingThatCannotBeKept)
     EXPECT_EQ(result.exitStatus, 1);
     EXPECT_EQ(
         result.errors,
-        "vclink-shell: Nothing was reverted, as what would be discarded can't be stored: git "
-        "can't read the index, or is not installed.\nTo discard it for good, use --forget.\n");
+        "vclink-shell: Nothing was reverted, because the changes can't be stored first: git can't "
+        "read the index, or is not installed.\nTo discard them without a copy, use --forget.\n");
     EXPECT_EQ(repository_.read("a"), "edited\n");
     EXPECT_TRUE(std::filesystem::is_empty(environment().temporary()));
 }
@@ -309,8 +308,8 @@ TEST_F(ShellRevert, SaysWhyASubmoduleKeepsItsCommit)
     inner.commitAll("more");
     const CommandResult result = runIn(repository_.path(), {"revert", "."});
     EXPECT_EQ(result.exitStatus, 1);
-    EXPECT_EQ(result.errors, "vclink-shell: Not all were reverted, as a submodule keeps its commit "
-                             "until \"git submodule update\":\n  inner\n");
+    EXPECT_EQ(result.errors, "vclink-shell: Not all were reverted, because a submodule keeps its "
+                             "commit until \"git submodule update\":\n  inner\n");
 }
 
 TEST_F(ShellRevert, RefusesFilesInConflictAndRevertsNothing)
@@ -345,10 +344,10 @@ TEST_F(ShellRevert, RefusesANameThatMeansChangedFilesThatWereNotNamed)
     EXPECT_THAT(letters(), IsEmpty());
     for (const std::string name : {"a[1].txt", "a1.txt"})
         repository_.write(name, "edited\n");
-    EXPECT_EQ(refuse({"revert", "a[1].txt"}),
-              "Nothing was reverted.\nA name with *, ? or [ is a pattern, and means these files "
-              "too:\n  a1.txt\nName them as well if you mean them, or use git for the file with "
-              "that name.\n");
+    EXPECT_EQ(
+        refuse({"revert", "a[1].txt"}),
+        "Nothing was reverted.\nA name with *, ? or [ is a pattern, and matches these files too:\n "
+        " a1.txt\nName them as well if you want them, or use git for the file with that name.\n");
     succeed({"revert", "a[1].txt", "a1.txt"});
     EXPECT_THAT(letters(), IsEmpty());
 }

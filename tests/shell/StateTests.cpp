@@ -33,7 +33,7 @@ TEST_F(ShellState, HasNoCurrentBranchBeforeTheFirstCommitOrOnACommit)
     EXPECT_EQ(runIn(empty.path(), {"branch", "new"}).errors,
               "vclink-shell: There is no commit yet that a branch could begin at.\n");
     EXPECT_EQ(runIn(empty.path(), {"revert", "."}).errors,
-              "vclink-shell: Nothing was reverted:\n  .: there are no files in it\n");
+              "vclink-shell: Nothing was reverted:\n  .: it has no files\n");
     repository_.git({"checkout", "--quiet", "--detach"});
     EXPECT_EQ(refuse({"current"}),
               "There is no current branch: HEAD is at a commit, not at a branch.\n");
@@ -56,13 +56,17 @@ TEST_F(ShellState, ShowsTheIdThatGitGivesARevision)
 
 TEST_F(ShellState, ShowsNoIdOfWhatNamesNothing)
 {
-    EXPECT_EQ(refuse({"rev", "nothing"}),
-              "Git could not complete the operation: revspec 'nothing' not found (code -3, "
-              "category 4)\n");
-    EXPECT_THAT(refuse({"--lang", "de", "rev", "HEAD:nothing"}),
-                StartsWith("Git konnte den Vorgang nicht abschließen: "));
-    for (const std::string revision : {"HEAD~7", "main..main", "[a]", "{}", "++"})
-        EXPECT_THAT(refuse({"rev", revision}), StartsWith("Git could not complete"));
+    EXPECT_EQ(refuse({"rev", "nothing"}), "There is no revision 'nothing'.\n");
+    EXPECT_EQ(refuse({"rev", "mian"}), "There is no revision 'mian'. Did you mean 'main'?\n");
+    EXPECT_EQ(refuse({"--lang", "de", "rev", "HEAD:nothing"}),
+              "Es gibt keine Revision 'HEAD:nothing'.\n");
+    for (const std::string revision : {"HEAD~7", "{}", "++"})
+        EXPECT_EQ(refuse({"rev", revision}), "There is no revision '" + revision + "'.\n");
+    EXPECT_THAT(refuse({"rev", "[a]"}), StartsWith("'[a]' is not a revision. "));
+    EXPECT_EQ(refuse({"rev", "main..main"}),
+              "'main..main' is not a revision. \"git help revisions\" describes how one is "
+              "written; a range is none.\n");
+    EXPECT_THAT(refuse({"rev", head().substr(0, 3)}), StartsWith("More than one object has an id"));
 }
 
 TEST_F(ShellState, TellsWhichOperationIsUnfinished)

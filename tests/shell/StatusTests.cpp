@@ -118,6 +118,20 @@ TEST_F(ShellStatus, TellsBothNamesOfARenamedFile)
                 ElementsAre(Record("added", "new"), Record("deleted", "old")));
 }
 
+TEST_F(ShellStatus, TellsBothNamesOfARenamedFileWithoutGitToo)
+{
+    GitRepository repository = makeRepository();
+    repository.write("old", "a text that is long enough to be found again\n");
+    repository.write(".gitignore", "*.o\n");
+    repository.commitAll("begin");
+    repository.write("ignored.o", "");
+    std::filesystem::create_directory(repository / "folder");
+    repository.git({"mv", "old", "folder/new"});
+    const Command status =
+        shell({"status"}).in(repository.path()).environment("PATH", folder().path().string());
+    EXPECT_EQ(status.run().output, "added\tfolder/new\ndeleted\told\n");
+}
+
 TEST_F(ShellStatus, TellsBothNamesOfARenamedFileWhereANewOneHasTheOldName)
 {
     GitRepository repository = makeRepository();

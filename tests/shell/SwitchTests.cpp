@@ -54,11 +54,12 @@ TEST_F(ShellSwitch, ChangesNothingWhereAChangeIsInTheWay)
 {
     repository_.write("a", "edited\n");
     repository_.write("folder/mine", "");
-    EXPECT_THAT(refuse({"switch", "other"}),
-                EndsWith(" (code -13, category 20)\nvclink-shell: These files have uncommitted "
-                         "changes, and are others on that branch:\n  a\nvclink-shell: Nothing was "
-                         "switched. Commit the changes or revert them, move untracked files out of "
-                         "the way, and\nswitch again.\n"));
+    EXPECT_THAT(
+        refuse({"switch", "other"}),
+        EndsWith(
+            " (code -13, category 20)\nvclink-shell: These files have uncommitted changes, and "
+            "differ on that branch:\n  a\nvclink-shell: Nothing was switched. Commit the changes "
+            "or revert them, move untracked files out of the way, and\nswitch again.\n"));
     EXPECT_THAT(refuse({"--lang", "de", "switch", "other"}),
                 StartsWith("Git konnte den Vorgang nicht abschließen: "));
 }
@@ -116,8 +117,9 @@ TEST_F(ShellSwitch, GoesToABranchWhateverItsName)
 TEST_F(ShellSwitch, RefusesABranchWhoseFilesWouldBeThoseOfATag)
 {
     repository_.git({"tag", "other", "main"});
-    EXPECT_EQ(refuse({"switch", "other"}), "Nothing was switched: other is a tag too, whose files "
-                                           "would be taken for the branch's.\n");
+    EXPECT_EQ(refuse({"switch", "other"}),
+              "Nothing was switched: there is also a tag other, and its files would be written "
+              "instead of the\nbranch's. Rename the tag or the branch first.\n");
     repository_.git({"tag", "--force", "-a", "-m", "same", "other", "refs/heads/other"});
     succeed({"switch", "other"});
     EXPECT_EQ(repository_.read("a"), "theirs\n");
@@ -182,7 +184,7 @@ TEST_F(ShellInterruptOfBranches, CancelsASwitchThatHasChangedNothing)
 {
     const std::string before = describe(repository_);
     std::string text;
-    EXPECT_EQ(interrupt("exec \"$0\" --log progress switch other", "Checkout Notify", text), 130);
+    EXPECT_EQ(interrupt(R"(exec "$0" --log progress switch other)", "Checkout Notify", text), 130);
     EXPECT_THAT(text, EndsWith("vclink-shell: The operation was cancelled.\n"));
     EXPECT_EQ(repository_.line({"symbolic-ref", "HEAD"}), "refs/heads/main");
     EXPECT_EQ(describe(repository_), before);
@@ -194,7 +196,8 @@ TEST_F(ShellInterruptOfBranches, CancelsASwitchThatHasChangedNothing)
 TEST_F(ShellInterruptOfBranches, ComesTooLateOnceFilesAreWritten)
 {
     std::string text;
-    EXPECT_EQ(interrupt("exec \"$0\" --log parameter switch other", "completed_steps=3 ", text), 0);
+    EXPECT_EQ(interrupt(R"(exec "$0" --log parameter switch other)", "completed_steps=3 ", text),
+              0);
     EXPECT_THAT(text, HasSubstr("Too late to cancel: files are being written.\n"));
     EXPECT_EQ(repository_.line({"symbolic-ref", "HEAD"}), "refs/heads/other");
     EXPECT_EQ(repository_.git({"status", "--porcelain"}), "");
@@ -205,7 +208,7 @@ TEST_F(ShellInterruptOfBranches, CancelsAMergeThatHasChangedNothing)
     commitFiles({{"a", "ours\n"}});
     const std::string before = describe(repository_);
     std::string text;
-    EXPECT_EQ(interrupt("exec \"$0\" --log progress merge other", "Checkout Notify", text), 130);
+    EXPECT_EQ(interrupt(R"(exec "$0" --log progress merge other)", "Checkout Notify", text), 130);
     EXPECT_THAT(text, HasSubstr("\nvclink-shell: \"other\" could not be merged into the current "
                                 "branch.\n"));
     EXPECT_THAT(text, testing::Not(HasSubstr("in conflict")));

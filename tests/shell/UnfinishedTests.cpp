@@ -53,11 +53,10 @@ TEST_F(ShellUnfinished, RebasesAreNotCutShort)
 {
     repository_.git({"checkout", "--quiet", "other"});
     begin({"rebase", "main"});
-    EXPECT_EQ(
-        refuse({"commit", "-m", "Work"}),
-        "Nothing was committed. A rebase is under way. Continue it with \"git rebase "
-        "--continue\", or undo it with \"git rebase --abort\".\nA commit would end it and lose "
-        "the rest of it. To commit all the same, use --as-is.\n");
+    EXPECT_EQ(refuse({"commit", "-m", "Work"}),
+              "Nothing was committed. A rebase is under way. Continue it with \"git rebase "
+              "--continue\", or undo it with \"git rebase --abort\".\nA commit would end it, and "
+              "lose its other steps. To commit nevertheless, use --as-is.\n");
     expectRefusedAs("A rebase");
     repository_.git({"-c", "core.editor=true", "rebase", "--continue"});
     EXPECT_EQ(content(), "solution\ntheirs\n");

@@ -95,8 +95,8 @@ TEST_F(ShellUnknownStates, AreSaidToBeBeforeTheFirstCommitToo)
     young.write("folder/new", "");
     EXPECT_EQ(errorsOf({"status"}),
               "vclink-shell: No file here has a state: either Git ignores all files, or libgit2 "
-              "can't read this working copy.\n\"git status\" may say which: a setting with a value "
-              "that it can't have, for example.\n");
+              "can't read this working copy,\nfor example because a setting has an invalid value. "
+              "\"git status\" may say which.\n");
     EXPECT_THAT(errorsOf({"add", "folder/new"}),
                 StartsWith("vclink-shell: No file here has a state: "));
     young.git({"config", "--unset", "core.ignorecase"});
@@ -132,8 +132,8 @@ class ShellBareFolder : public ShellMergeFixture
     {
         return "vclink-shell: " + (repository_ / "bare").string() +
                " is a bare repository inside the working copy " + repository_.path().string() +
-               ". If it came with a clone, its\nconfiguration did too, and may name commands that "
-               "then run. If you trust it, use --bare.\n";
+               ". If it came with a clone, so did\nits configuration, which can run commands. If "
+               "you trust it, use --bare.\n";
     }
 };
 
