@@ -146,7 +146,19 @@ const std::vector<SubmoduleOperation> submoduleOperations{
      2,
      {"removes", "renames", "adds"}},
     besideSiblings({"merge of submodules", "ours", mergeByGit, mergeInto, 2}),
-    besideSiblings({"switch of submodules", "main", {"switch", "--quiet"}, switchTo, 2})};
+    besideSiblings({"fast-forward of submodules",
+                    "main",
+                    {"merge", "--quiet", "--ff-only"},
+                    mergeInto,
+                    2,
+                    {"moves", "removes", "adds"}}),
+    besideSiblings({"switch of submodules", "main", {"switch", "--quiet"}, switchTo, 2}),
+    besideSiblings({"switch of submodules and back",
+                    "main",
+                    thereAndBackByGit,
+                    switchThereAndBack,
+                    2,
+                    {"removes", "renames", "adds"}})};
 
 /// The obstacles other than submodules that can matter to submodules.
 const std::vector<std::string> otherObstacles{"untracked file",

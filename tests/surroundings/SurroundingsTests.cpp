@@ -53,6 +53,7 @@ const std::vector<Operation> operations{
     {"fastForward", "main", {"merge", "--quiet", "--ff-only"}, mergeBranch, 2},
     {"switch", "main", {"switch", "--quiet"}, switchBranch, 1},
     {"merge", "ours", {"merge", "--quiet", "--no-edit"}, mergeBranch, 1, true},
+    {"fastForward", "main", {"merge", "--quiet", "--ff-only"}, mergeBranch, 2, true},
     {"switch", "main", {"switch", "--quiet"}, switchBranch, 2, true}};
 
 class FileSurroundings : public Surroundings
