@@ -263,13 +263,26 @@ INSTANTIATE_TEST_SUITE_P(Operations, BranchesWithSubmodules, testing::ValuesIn(s
                              return name;
                          });
 
-class RevertsWithSubmodules : public SubmoduleSurroundings, public testing::WithParamInterface<bool>
+enum class ListedBeside
 {
+    OtherFile,
+    Submodule,
+    SubmoduleAndSibling
+};
+
+class RevertsWithSubmodules : public testing::WithParamInterface<ListedBeside>,
+                              public SubmoduleSurroundings
+{
+  protected:
+    RevertsWithSubmodules() : SubmoduleSurroundings(GetParam() == ListedBeside::SubmoduleAndSibling)
+    {
+    }
 };
 
 TEST_P(RevertsWithSubmodules, LoseNothingThatGitKeepsAndOtherwiseDifferByRuleOnly)
 {
-    const bool isListed = GetParam();
+    const bool isListed = GetParam() != ListedBeside::OtherFile;
+    const bool hasSiblings = GetParam() == ListedBeside::SubmoduleAndSibling;
     const std::string operation =
         isListed ? "revert of submodules" : "revert of a file beside submodules";
     go("main");
@@ -277,7 +290,8 @@ TEST_P(RevertsWithSubmodules, LoseNothingThatGitKeepsAndOtherwiseDifferByRuleOnl
     {
         for (const auto &obstacle : obstacles_)
         {
-            const bool isWorthwhile = isListed || obstacle.isCommon;
+            const bool isWorthwhile =
+                hasSiblings ? hasSibling(place) : isListed || obstacle.isCommon;
             if (obstacle.place != place.holds || place.branch != "unrelated" || !isWorthwhile)
                 continue;
             std::vector<std::string> byGit{"restore", "--source=HEAD", "--staged", "--worktree",
@@ -287,6 +301,12 @@ TEST_P(RevertsWithSubmodules, LoseNothingThatGitKeepsAndOtherwiseDifferByRuleOnl
             {
                 byGit.push_back(place.path);
                 names.push_back(place.path);
+            }
+            const std::string sibling = vclink::test::siblingOf(place.path);
+            if (hasSiblings)
+            {
+                byGit.push_back(sibling);
+                names.push_back(sibling);
             }
             const auto byLibrary = [&](const fs::path &copy)
             {
@@ -299,19 +319,33 @@ TEST_P(RevertsWithSubmodules, LoseNothingThatGitKeepsAndOtherwiseDifferByRuleOnl
                                      makeAdapter(copy)->revertFiles(paths);
                                  });
             };
-            check({{operation, obstacle.name, place.name, "", ""},
+            check({{operation, obstacle.name, place.name, "", "", hasSiblings},
                    obstacle,
                    place,
                    byGit,
                    byLibrary,
-                   [](const GitRepository &copy) { copy.remove("mine"); }});
+                   [&](const GitRepository &copy)
+                   {
+                       copy.remove("mine");
+                       if (hasSiblings)
+                           copy.write(sibling, "edited\n");
+                   }});
         }
     }
-    conclude(operation);
+    conclude(operation, hasSiblings);
 }
 
-INSTANTIATE_TEST_SUITE_P(Lists, RevertsWithSubmodules, testing::Bool(),
+INSTANTIATE_TEST_SUITE_P(Lists, RevertsWithSubmodules,
+                         testing::Values(ListedBeside::Submodule, ListedBeside::OtherFile,
+                                         ListedBeside::SubmoduleAndSibling),
                          [](const auto &instance)
-                         { return instance.param ? "OfThem" : "OfAnotherFile"; });
+                         {
+                             const bool hasSiblings =
+                                 instance.param == ListedBeside::SubmoduleAndSibling;
+                             const bool isListed = instance.param != ListedBeside::OtherFile;
+                             return hasSiblings ? "OfThemAndSiblings"
+                                    : isListed  ? "OfThem"
+                                                : "OfAnotherFile";
+                         });
 
 } // namespace
