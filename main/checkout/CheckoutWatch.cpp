@@ -261,23 +261,26 @@ void CheckoutWatch::passProgress(const char *path, std::size_t completed, std::s
                                  void *payload) noexcept
 {
     auto &watch = *static_cast<CheckoutWatch *>(payload);
-    watch.hardLinks_.part();
+    watch.remade_.remove();
     if (watch.progress_ != nullptr)
     {
         watch.progress_(path, completed, total, watch.progressPayload_);
     }
 }
 
-Finding CheckoutWatch::noteHardLink(const CheckoutNotice &notice)
+Finding CheckoutWatch::noteOverwritten(const CheckoutNotice &notice)
 {
     const bool makesFile = notice.why == GIT_CHECKOUT_NOTIFY_UPDATED && notice.target != nullptr &&
                            !isGitlink(notice.target);
-    if (!makesFile || hardLinks_.note(path_.assign(root_).append(notice.path)))
+    if (!makesFile)
     {
         return {};
     }
-    return Obstacle{notice.path, "the file '" + std::string(notice.path) +
-                                     "' has further names, and its folder cannot be written to"};
+    const bool isExecutable = notice.target->mode == GIT_FILEMODE_BLOB_EXECUTABLE;
+    const std::string reason = remade_.note(path_.assign(root_).append(notice.path), isExecutable);
+    return reason.empty()
+               ? Finding()
+               : Obstacle{notice.path, "the file '" + std::string(notice.path) + "' " + reason};
 }
 
 int CheckoutWatch::hear(const CheckoutNotice &notice)
@@ -289,7 +292,7 @@ int CheckoutWatch::hear(const CheckoutNotice &notice)
     if (kind_ == CheckoutKind::Revert)
     {
         const Finding found = clearAll(notice);
-        return answer(found ? found : noteHardLink(notice));
+        return answer(found ? found : noteOverwritten(notice));
     }
     if (!copy_)
     {
@@ -306,7 +309,7 @@ int CheckoutWatch::hear(const CheckoutNotice &notice)
         }
     }
     const Finding found = judge(notice);
-    return answer(found ? found : noteHardLink(notice));
+    return answer(found ? found : noteOverwritten(notice));
 }
 
 int CheckoutWatch::answer(const Finding &found)

@@ -10,9 +10,9 @@
 
 #include "error/errorUtil/OwnedHandle.hpp"
 #include "main/checkout/ClearedWay.hpp"
-#include "main/checkout/HardLinks.hpp"
 #include "main/checkout/MergeSubmodules.hpp"
 #include "main/checkout/Obstacle.hpp"
+#include "main/checkout/RemadeFiles.hpp"
 #include "main/checkout/SwitchSubmodules.hpp"
 #include "main/checkout/WorkingCopy.hpp"
 #include "main/checkout/noticedObstacles.hpp"
@@ -85,7 +85,7 @@ class CheckoutWatch
                              void *payload) noexcept;
     int hear(const CheckoutNotice &notice);
     int answer(const Finding &found);
-    Finding noteHardLink(const CheckoutNotice &notice);
+    Finding noteOverwritten(const CheckoutNotice &notice);
     Finding judge(const CheckoutNotice &notice);
     Finding judgeSwitch(WorkingCopy &copy, const TreeChange &change);
     void makeWay(const CheckoutNotice &notice);
@@ -115,7 +115,7 @@ class CheckoutWatch
     /// place.
     std::string replaced_;
     ClearedWay cleared_;
-    HardLinks hardLinks_;
+    RemadeFiles remade_;
     /// A buffer for what is looked at for each file.
     std::string path_;
 };

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-#include "main/checkout/HardLinks.hpp"
+#include "main/checkout/RemadeFiles.hpp"
 
 #include <filesystem>
 #include <string>

@@ -1,0 +1,286 @@
+// SPDX-License-Identifier: MIT
+#include "main/checkout/RemadeFiles.hpp"
+
+#include <csignal>
+#include <filesystem>
+#include <functional>
+#include <string>
+#include <vector>
+
+#include <fcntl.h>
+#include <gtest/gtest.h>
+#include <sys/stat.h>
+#include <sys/wait.h>
+#include <unistd.h>
+
+#include "ObstacleFixture.hpp"
+#include "support/UnprivilegedUser.hpp"
+#include "support/text.hpp"
+
+namespace
+{
+
+namespace fs = std::filesystem;
+using vclink::test::asPath;
+using vclink::test::failureOf;
+using vclink::test::giveToUnprivilegedUser;
+using vclink::test::runAsUnprivilegedUser;
+
+/// Tracked files that libgit2 cannot open for writing, between others that it writes. git makes
+/// them anew.
+class UnwritableFiles : public vclink::test::ObstacleFixture
+{
+  protected:
+    UnwritableFiles()
+    {
+        for (const auto *name : {"a", "d/r", "z"})
+            repository_.write(name, "old\n");
+        repository_.commitAll("files");
+    }
+    /// What changes all of them, and adds a file.
+    std::function<void()> changingAll() const
+    {
+        return [this]
+        {
+            for (const auto *name : {"a", "d/r", "n", "z"})
+                repository_.write(name, "theirs\n");
+        };
+    }
+    /// What `action` comes to as the user of the working copy, who may not write to "d/r".
+    std::string unprivileged(const std::function<void()> &action) const
+    {
+        repository_.git({"config", "--global", "safe.directory", "*"});
+        giveToUnprivilegedUser(folder().path());
+        repository_.setMode("d/r", 0444);
+        return runAsUnprivilegedUser(
+            [&]
+            {
+                try
+                {
+                    action();
+                }
+                catch (const std::exception &exception)
+                {
+                    return std::string(exception.what());
+                }
+                return std::string();
+            });
+    }
+    void expectAll(const std::string &content) const
+    {
+        for (const auto *name : {"a", "d/r", "z"})
+            EXPECT_EQ(repository_.read(name), content) << name;
+    }
+    void expectMode(const std::string &name, mode_t mode) const
+    {
+        struct stat status = {};
+        ASSERT_EQ(::stat((repository_ / name).c_str(), &status), 0);
+        EXPECT_EQ(status.st_mode & ALLPERMS, mode);
+    }
+};
+
+TEST_F(UnwritableFiles, AreMadeAnewByASwitch)
+{
+    makeBranch("topic", changingAll());
+    EXPECT_EQ(unprivileged([this] { branches().switchBranch("topic"); }), "");
+    expectAll("theirs\n");
+    expectMode("d/r", 0644);
+    EXPECT_EQ(currentBranch(), "refs/heads/topic");
+}
+
+TEST_F(UnwritableFiles, AreMadeAnewByAFastForward)
+{
+    makeBranch("topic", changingAll());
+    EXPECT_EQ(unprivileged([this] { merge("topic"); }), "");
+    expectAll("theirs\n");
+    EXPECT_EQ(idOf("HEAD"), idOf("topic"));
+}
+
+TEST_F(UnwritableFiles, AreMadeAnewByAMerge)
+{
+    diverge(writing("ours", "x"), changingAll());
+    EXPECT_EQ(unprivileged([this] { merge("topic"); }), "");
+    expectAll("theirs\n");
+    EXPECT_EQ(parents().size(), 2U);
+}
+
+TEST_F(UnwritableFiles, InConflictAreMadeAnewByAMerge)
+{
+    repository_.write(".gitattributes", "z -merge\n");
+    repository_.commitAll("attributes");
+    diverge(
+        [this]
+        {
+            for (const auto *name : {"a", "d/r", "z"})
+                repository_.write(name, "ours\n");
+        },
+        [this]
+        {
+            repository_.write("a", "theirs\n");
+            repository_.write("z", "theirs\n");
+            repository_.remove("d/r");
+        });
+    const std::string text = unprivileged(
+        [this]
+        {
+            for (const auto *name : {"a", "z"})
+                repository_.setMode(name, 0444);
+            expectConflicts("topic");
+        });
+    EXPECT_EQ(text, "");
+    EXPECT_EQ(repository_.read("z"), "ours\n");
+    EXPECT_EQ(repository_.read("d/r"), "ours\n");
+    EXPECT_EQ(conflicts().size(), 8U);
+}
+
+TEST_F(UnwritableFiles, AreRestoredByARevert)
+{
+    const auto all = [this]
+    {
+        std::vector<upath> files;
+        for (const auto *name : {"a", "d/r", "z"})
+            files.push_back(asPath((repository_ / name).string()));
+        adapter_->revertFiles(files);
+    };
+    for (const auto *name : {"a", "d/r", "z"})
+        repository_.write(name, "mine\n");
+    EXPECT_EQ(unprivileged(all), "");
+    expectAll("old\n");
+    expectMode("d/r", 0644);
+}
+
+TEST_F(UnwritableFiles, KeepThePermissionToExecute)
+{
+    repository_.setMode("d/r", 0755);
+    repository_.commitAll("program");
+    makeBranch("topic", changingAll());
+    const std::string text = unprivileged(
+        [this]
+        {
+            repository_.setMode("d/r", 0555);
+            branches().switchBranch("topic");
+        });
+    EXPECT_EQ(text, "");
+    expectMode("d/r", 0755);
+}
+
+TEST_F(UnwritableFiles, ThatAreEditedAreLeftIfTheCheckoutIsRefused)
+{
+    makeBranch("topic", changingAll());
+    repository_.write("d/r", "mine\n");
+    EXPECT_NE(unprivileged([this] { branches().switchBranch("topic"); }), "");
+    EXPECT_EQ(repository_.read("d/r"), "mine\n");
+    EXPECT_EQ(repository_.read("a"), "old\n");
+    expectMode("d/r", 0444);
+}
+
+TEST_F(UnwritableFiles, InAFolderThatCannotBeWrittenToAreRefused)
+{
+    makeBranch("topic", changingAll());
+    giveToUnprivilegedUser(folder().path());
+    repository_.setMode("d/r", 0444);
+    repository_.setMode("d", 0555);
+    const std::string text = runAsUnprivilegedUser(
+        [this] { return failureOf([this] { branches().switchBranch("topic"); }).text; });
+    repository_.setMode("d", 0755);
+    EXPECT_EQ(text, "the file 'd/r' cannot be written to, and its folder cannot be written to");
+    expectAll("old\n");
+    EXPECT_FALSE(fs::exists(repository_ / "n"));
+}
+
+/// libgit2 makes such a file anew.
+TEST_F(UnwritableFiles, ThatChangeTheirPermissionsInSuchAFolderAreRefused)
+{
+    makeBranch("topic",
+               [this]
+               {
+                   changingAll()();
+                   repository_.setMode("d/r", 0755);
+               });
+    giveToUnprivilegedUser(folder().path());
+    repository_.setMode("d", 0555);
+    const std::string text = runAsUnprivilegedUser(
+        [this] { return failureOf([this] { branches().switchBranch("topic"); }).text; });
+    repository_.setMode("d", 0755);
+    EXPECT_EQ(text, "the file 'd/r' changes its permissions, and its folder cannot be written to");
+    expectAll("old\n");
+    EXPECT_FALSE(fs::exists(repository_ / "n"));
+}
+
+/// Only the owner may remove another user's file from a folder like /tmp.
+TEST_F(UnwritableFiles, OfAnotherUserInAFolderWithTheStickyBitAreRefused)
+{
+    if (!vclink::test::runsAsRoot())
+    {
+        return;
+    }
+    makeBranch("topic", changingAll());
+    giveToUnprivilegedUser(folder().path());
+    ASSERT_EQ(::chown((repository_ / "d").c_str(), 0, 0), 0);
+    ASSERT_EQ(::chown((repository_ / "d/r").c_str(), 0, 0), 0);
+    repository_.setMode("d", 01777);
+    const std::string text = runAsUnprivilegedUser(
+        [this] { return failureOf([this] { branches().switchBranch("topic"); }).text; });
+    EXPECT_EQ(text, "the file 'd/r' cannot be written to, and its folder cannot be written to");
+    EXPECT_EQ(repository_.read("a"), "old\n");
+    EXPECT_EQ(repository_.read("d/r"), "old\n");
+}
+
+/// A program that lies in the working copy and runs.
+class RunningProgram : public UnwritableFiles
+{
+  protected:
+    RunningProgram()
+    {
+        fs::copy_file("/bin/sleep", repository_ / "program");
+        repository_.commitAll("program");
+        makeBranch("topic",
+                   [this]
+                   {
+                       changingAll()();
+                       repository_.write("program", "theirs\n");
+                   });
+        start();
+    }
+    ~RunningProgram() override
+    {
+        if (process_ > 0)
+        {
+            ::kill(process_, SIGKILL);
+            ::waitpid(process_, nullptr, 0);
+        }
+    }
+    void start()
+    {
+        const std::string program = (repository_ / "program").string();
+        int ends[2];
+        ASSERT_EQ(::pipe2(ends, O_CLOEXEC), 0);
+        process_ = ::fork();
+        ASSERT_NE(process_, -1);
+        if (process_ == 0)
+        {
+            ::execl(program.c_str(), program.c_str(), "600", nullptr);
+            ::_exit(127);
+        }
+        ::close(ends[1]);
+        char none = 0;
+        // The end of the pipe comes when the program has begun.
+        EXPECT_EQ(::read(ends[0], &none, 1), 0);
+        ::close(ends[0]);
+        ASSERT_EQ(::waitpid(process_, nullptr, WNOHANG), 0);
+    }
+
+  private:
+    pid_t process_ = -1;
+};
+
+TEST_F(RunningProgram, IsMadeAnewByASwitch)
+{
+    branches().switchBranch("topic");
+    expectAll("theirs\n");
+    EXPECT_EQ(repository_.read("program"), "theirs\n");
+    expectMode("program", 0755);
+    EXPECT_TRUE(status().empty());
+}
+
+} // namespace
