@@ -5,11 +5,8 @@
 #include <cerrno>
 #include <cstddef>
 #include <cstring>
-#include <filesystem>
-#include <memory>
 #include <utility>
 
-#include <dirent.h>
 #include <fcntl.h>
 #include <git2.h>
 #include <sys/stat.h>
@@ -92,24 +89,17 @@ bool WorkingCopy::hasSiblingBeforeFolder(const std::string &folder) const
     const std::size_t start = slash == std::string::npos ? 0 : slash + 1;
     const std::string name = folder.substr(start);
     const std::string parent = root_ + folder.substr(0, start);
-    const std::unique_ptr<DIR, int (*)(DIR *)> siblings(::opendir(parent.c_str()), ::closedir);
-    if (siblings == nullptr)
-    {
-        return true;
-    }
-    errno = 0;
-    while (const dirent *const entry = ::readdir(siblings.get()))
-    {
-        const std::string sibling = entry->d_name;
-        const bool isLonger =
-            sibling.size() > name.size() && sibling.compare(0, name.size(), name) == 0;
-        if (isLonger && static_cast<unsigned char>(sibling[name.size()]) < '/')
+    bool isFound = false;
+    const bool isRead = visitFolder(
+        parent,
+        [&](const std::string &sibling)
         {
-            return true;
-        }
-        errno = 0;
-    }
-    return errno != 0;
+            const bool isLonger =
+                sibling.size() > name.size() && sibling.compare(0, name.size(), name) == 0;
+            isFound = isLonger && static_cast<unsigned char>(sibling[name.size()]) < '/';
+            return !isFound;
+        });
+    return isFound || !isRead;
 }
 
 const WorkingCopy::Way &WorkingCopy::wayTo(const std::string &name)
@@ -283,20 +273,25 @@ bool WorkingCopy::isFolderInHead(const std::string &name) const
 
 std::string WorkingCopy::foreignBelow(const std::string &folder) const
 {
-    namespace fs = std::filesystem;
-    std::error_code error;
-    fs::recursive_directory_iterator entry(root_ + folder, error);
-    for (; !error && entry != fs::recursive_directory_iterator(); entry.increment(error))
-    {
-        std::string name = entry->path().string().substr(root_.size());
-        const bool isFolder = entry->symlink_status(error).type() == fs::file_type::directory;
-        const git_object_t type = typeInHead(name);
-        if (isFolder ? type != GIT_OBJECT_TREE : type != GIT_OBJECT_BLOB)
-        {
-            return name;
-        }
-    }
-    return error ? folder : "";
+    std::string foreign;
+    const bool isRead =
+        visitFolder(root_ + folder,
+                    [&](const std::string &entry)
+                    {
+                        const std::string name = folder + '/' + entry;
+                        const bool isFolder = standingAt(root_ + name) == Standing::Folder;
+                        const git_object_t type = typeInHead(name);
+                        if (isFolder ? type != GIT_OBJECT_TREE : type != GIT_OBJECT_BLOB)
+                        {
+                            foreign = name;
+                        }
+                        else if (isFolder)
+                        {
+                            foreign = foreignBelow(name);
+                        }
+                        return foreign.empty();
+                    });
+    return isRead ? foreign : folder;
 }
 
 std::string WorkingCopy::stagedBelow(const std::string &folder) const

@@ -46,28 +46,37 @@ bool holdsFiles(const std::string &path)
     {
         return false;
     }
+    bool isFound = false;
+    const bool isRead =
+        visitFolder(path,
+                    [&](const std::string &entry)
+                    {
+                        const std::string inside = path + '/' + entry;
+                        isFound = standingAt(inside) != Standing::Folder || holdsFiles(inside);
+                        return !isFound;
+                    });
+    return isFound || !isRead;
+}
+
+bool visitFolder(const std::string &path, const std::function<bool(const std::string &)> &visitor)
+{
     // The standard library's iterators end the process if memory runs out.
     const std::unique_ptr<DIR, int (*)(DIR *)> folder(::opendir(path.c_str()), ::closedir);
     if (folder == nullptr)
     {
-        return true;
+        return false;
     }
     errno = 0;
     while (const dirent *const entry = ::readdir(folder.get()))
     {
         const std::string name = entry->d_name;
-        if (name == "." || name == "..")
-        {
-            continue;
-        }
-        const std::string inside = path + '/' + name;
-        if (standingAt(inside) != Standing::Folder || holdsFiles(inside))
+        if (name != "." && name != ".." && !visitor(name))
         {
             return true;
         }
         errno = 0;
     }
-    return errno != 0;
+    return errno == 0;
 }
 
 std::string readLink(const std::string &path)

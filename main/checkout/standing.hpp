@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include <functional>
 #include <string>
 
 namespace vclink::git
@@ -26,6 +27,12 @@ Standing standingAt(const std::string &path);
 /// @param path absolute
 /// @throws LibGit2Exception if the path cannot be examined
 bool holdsFiles(const std::string &path);
+
+/// Visits what is in a folder, except "." and "..", until the visitor returns false.
+/// @param path absolute
+/// @param visitor receives the name; can throw
+/// @return false if the folder cannot be read
+bool visitFolder(const std::string &path, const std::function<bool(const std::string &)> &visitor);
 
 /// Returns the target of a link, empty if it cannot be read.
 /// @param path absolute

@@ -128,6 +128,7 @@ std::vector<Operation> branchOperations()
         {"switchBranch", makeBranches, doing(switchBranch), refused, abort},
         {"switchToCurrentBranch", makeBranches, doing(switchToCurrentBranch), refused, abort},
         {"switchBranchUnderLink", makeLinkedFolder, doing(switchBranch), refused, abort},
+        {"switchBranchOverFolder", makeReplacedFolder, doing(switchBranch), refused, abort},
         {"switchBranchWithSubmodules", makeSubmodules, doing(switchBranch), refused, abort},
         {"createBranch", makeBranches, doing(createBranch), refused, {{"branch", "-D", "fresh"}}},
         {"deleteBranch", makeBranches, doing(deleteBranch), refused, {{"branch", "topic"}}},

@@ -136,6 +136,18 @@ void makeLinkedFolder(GitRepository &repository)
     repository.symlink("nowhere", "sub");
 }
 
+void makeReplacedFolder(GitRepository &repository)
+{
+    makePlain(repository);
+    repository.write("sub/deep/inside", "x\n");
+    repository.commitAll("deeper");
+    repository.git({"checkout", "--quiet", "-b", "topic"});
+    repository.remove("sub");
+    repository.write("sub", "theirs\n");
+    repository.commitAll("on topic");
+    repository.git({"checkout", "--quiet", "main"});
+}
+
 void makeUpToDate(GitRepository &repository)
 {
     makeBranches(repository);

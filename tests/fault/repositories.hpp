@@ -32,6 +32,8 @@ void makeTypeChange(GitRepository &repository);
 void makeBranches(GitRepository &repository);
 /// Branches, with an untracked link in the place of "sub", which both branches have.
 void makeLinkedFolder(GitRepository &repository);
+/// Plain with a folder in "sub", and the branch "topic", where "sub" is a file.
+void makeReplacedFolder(GitRepository &repository);
 /// Branches, with main where "topic" is.
 void makeUpToDate(GitRepository &repository);
 /// Branches, with another change of other files on main.
