@@ -3,7 +3,10 @@
 #include <algorithm>
 #include <cstddef>
 #include <memory>
+#include <set>
 #include <string>
+#include <utility>
+#include <vector>
 
 #include <git2/checkout.h>
 #include <git2/errors.h>
@@ -15,10 +18,12 @@
 #include "fl/i18n/convert.hpp"
 #include "main/checkout/CheckoutWatch.hpp"
 #include "main/files/GitAdapter.hpp"
+#include "main/files/ListedFiles.hpp"
 #include "main/files/foldersInIndex.hpp"
 #include "options/gitRecords.hpp"
 #include "util/lock/IndexLock.hpp"
 #include "util/path/PathspecArray.hpp"
+#include "util/path/paths.hpp"
 #include "util/repository/repository.hpp"
 #include "vclink/git/messageIdentifiers.hpp"
 #include "vclink/util/generateFileReport.hpp"
@@ -82,12 +87,44 @@ void resetToHead(git_repository *repository, const git_object *head, const Paths
     reset.value();
 }
 
+[[noreturn]] void raiseConflicted(std::vector<upath> files)
+{
+    raise(shared_vclink::git::Conflicted(vclink::util::generateFileReport(std::move(files))));
+}
+
+/// Raises if one of the listed files is in conflict. The states do not say so if they could
+/// not be read, or if another process has merged since.
+void refuseConflicts(git_index *index, const PathspecArray &pathspec, const upath &root)
+{
+    if (git_index_has_conflicts(index) == 0)
+    {
+        return;
+    }
+    const ListedFiles listed(index, pathspec.array());
+    std::set<upath> conflicted;
+    ustring buffer;
+    const std::size_t count = git_index_entrycount(index);
+    for (std::size_t i = 0; i < count; ++i)
+    {
+        const git_index_entry *const entry = git_index_get_byindex(index, i);
+        if (GIT_INDEX_ENTRY_STAGE(entry) != GIT_INDEX_STAGE_NORMAL && listed.contain(entry->path))
+        {
+            conflicted.insert(joinRepositoryPath(root, entry->path, buffer));
+        }
+    }
+    if (!conflicted.empty())
+    {
+        raiseConflicted({conflicted.begin(), conflicted.end()});
+    }
+}
+
 void resetEntries(git_repository *repository, const git_object *head, const PathspecArray &pathspec,
-                  const std::vector<std::string> &names)
+                  const std::vector<std::string> &names, const upath &root)
 {
     // The index of the resets and the checkout. Without this call it would be empty if libgit2
     // cannot read the index file, and would then have only these entries.
     const OwnedHandle<git_index> index = getRepositoryIndex(repository);
+    refuseConflicts(index.get(), pathspec, root);
     resetToHead(repository, head, pathspec, names.size());
     // If a file became a link in the index, or a link a file, the first reset removes it from the
     // index and the second one restores it.
@@ -116,7 +153,7 @@ FileStateMap GitAdapter::throwIfConflicted(const std::vector<upath> &files)
     }
     if (!conflicted.empty())
     {
-        raise(shared_vclink::git::Conflicted(vclink::util::generateFileReport(conflicted)));
+        raiseConflicted(std::move(conflicted));
     }
     return states;
 }
@@ -134,8 +171,8 @@ void GitAdapter::revertFiles(const std::vector<upath> &files)
     // Without a HEAD the reset removes the paths from the index.
     const GitResult<OwnedHandle<git_object>> head = revparseObject(repository.get(), "HEAD");
     const std::vector<std::string> names = changedNames(states, root_);
-    resetEntries(repository.get(), head.has_value() ? head.value().get() : nullptr, pathspec,
-                 names);
+    resetEntries(repository.get(), head.has_value() ? head.value().get() : nullptr, pathspec, names,
+                 root_);
     const std::shared_ptr<GitOptionsFactory> factory = optionsFactory_;
     CheckoutOptions options = factory->makeCheckoutOptions();
     options.checkoutStrategy = GIT_CHECKOUT_FORCE | GIT_CHECKOUT_RECREATE_MISSING;

@@ -243,7 +243,7 @@ TEST_F(RevertObstacles, AreFilesInThePlaceOfASubmodule)
     EXPECT_EQ(workingTreeOf(repository_), before);
 }
 
-/// The states are not known then, and are not needed.
+/// The states are not known then. The index tells which files are in conflict: none here.
 TEST_F(RevertObstacles, HoldsInARevertWhoseStateWalkFails)
 {
     GitRepository::init(repository_ / "line\nfeed").commit("first");

@@ -223,6 +223,25 @@ TEST_F(RevertFiles, ReportsTheFilesInConflictAlsoThoseOfAFolderInTheOrderOfPaths
                               });
 }
 
+/// libgit2 gives no states then. The index knows the conflicts all the same.
+TEST_F(RevertFiles, RefusesAFileInConflictWhereTheStatesCannotBeRead)
+{
+    GitRepository::init(repository_ / "Module").commit("first");
+    repository_.write(".gitmodules", "[submodule \"m\"]\n\tpath = Module\n\turl = ../m\n");
+    repository_.commitAll("submodule");
+    beginMerge({"conflicted", "a/x"});
+    repository_.write(".gitmodules", "<<<<<<< HEAD\n");
+    repository_.write("conflicted", "half resolved\n");
+    repository_.write("file", "edited\n");
+    ASSERT_EQ(states(repository_, {"Module", "conflicted"}), States());
+    const NothingChanges nothing(repository_);
+    expectRefusal<Conflicted>(inRoot({"a/x", "conflicted"}),
+                              [this] {
+                                  revert({"file", "Module", "conflicted", "a"});
+                              });
+    expectRefusal<Conflicted>(inRoot({"a/x", "conflicted"}), [this] { revert({"*"}); });
+}
+
 TEST_F(RevertFiles, RefusesWithTheCataloguesText)
 {
     beginMerge({"conflicted"});
