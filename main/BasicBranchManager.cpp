@@ -24,6 +24,7 @@
 #include "util/lock/referenceLocks.hpp"
 #include "util/repository/objectIds.hpp"
 #include "util/repository/repository.hpp"
+#include "util/scope/KeptMode.hpp"
 
 namespace vclink::git
 {
@@ -199,6 +200,7 @@ void BasicBranchManager::deleteBranch(const BranchName &name)
         refuseDeletionInUnfinishedOperation(repository.get(), reference);
         // libgit2 removes the branch's configuration first, and does not restore it.
         awaitUnlocked(repository.get(), reference);
+        const KeptMode mode(git_repository_commondir(repository.get()) + std::string("config"));
         return call(git_branch_delete, branch.get());
     };
     PackedReferences packed(repository.get());

@@ -11,6 +11,7 @@
 #include "fl/i18n/convert.hpp"
 #include "main/toolCommands.hpp"
 #include "scl/core/memory/make_unique_incomplete.hpp"
+#include "util/scope/KeptMode.hpp"
 #include "vclink/git/LibGit2Guard.hpp"
 
 namespace vclink::git
@@ -34,9 +35,13 @@ class Buffer
     {
         return &buffer_;
     }
+    std::string bytes() const
+    {
+        return std::string(buffer_.ptr, buffer_.size);
+    }
     ustring text() const
     {
-        return fl::i18n::utf8_to_ustring(std::string(buffer_.ptr, buffer_.size));
+        return fl::i18n::utf8_to_ustring(bytes());
     }
 
   private:
@@ -54,8 +59,18 @@ std::optional<ustring> read(git_config *config, const ConfigKey &key)
     return value.text();
 }
 
+/// Returns an empty path if the file does not exist.
+std::string pathFrom(int (*find)(git_buf *))
+{
+    Buffer path;
+    return find(path.get()) == 0 ? path.bytes() : std::string();
+}
+
 void write(git_config *config, const ToolCommand &tool)
 {
+    // libgit2 writes one of the two.
+    const KeptMode inXdgFolder(pathFrom(git_config_find_xdg));
+    const KeptMode inHome(pathFrom(git_config_find_global));
     const std::string key = configKeyString(tool.key);
     const std::string value = quotedCommand(toolLauncherPath(tool), tool.arguments);
     check(git_config_set_string, config, asGitString(key), asGitString(value));

@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: MIT
+#include <cstddef>
 #include <filesystem>
 #include <string>
 #include <type_traits>
@@ -159,6 +160,31 @@ TEST_F(DeleteBranch, RemovesAPackedBranchWithItsSettingsAndItsReflog)
     EXPECT_FALSE(repository_.tryGit({"rev-parse", "--verify", "refs/heads/topic"}).succeeded());
     EXPECT_FALSE(repository_.tryGit({"config", "branch.topic.remote"}).succeeded());
     EXPECT_FALSE(std::filesystem::exists(repository_ / ".git/logs/refs/heads/topic"));
+}
+
+/// Also in a linked working tree, and if several lines are removed, each by a new file.
+TEST_F(DeleteBranch, KeepsTheModeOfTheConfiguration)
+{
+    const auto file = repository_ / ".git/config";
+    repository_.git({"worktree", "add", "--quiet", "-b", "second", (folder() / "linked").string()});
+    const auto linked = makeAdapter(folder() / "linked");
+    const auto branchesOfLinked = vclink::git::BranchManager::create(*linked);
+    for (const auto mode : {std::filesystem::perms(0600), std::filesystem::perms(0664)})
+    {
+        for (auto *const manager : {&branches(), branchesOfLinked.get()})
+        {
+            for (const std::size_t settings : {1U, 2U, 3U})
+            {
+                repository_.git({"branch", "topic"});
+                for (std::size_t i = 0; i < settings; ++i)
+                    repository_.git({"config", "branch.topic.key" + std::to_string(i), "value"});
+                std::filesystem::permissions(file, mode);
+                manager->deleteBranch("topic");
+                EXPECT_EQ(std::filesystem::status(file).permissions(), mode);
+                EXPECT_FALSE(repository_.tryGit({"config", "branch.topic.key0"}).succeeded());
+            }
+        }
+    }
 }
 
 TEST_F(DeleteBranch, FailsForTheCurrentBranchOfThisOrALinkedWorktree)

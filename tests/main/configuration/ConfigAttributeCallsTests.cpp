@@ -110,7 +110,8 @@ TEST_F(ConfigCalls, OfAWriteAReadAndThePathAreOneEach)
     config.writeDiffTool();
     EXPECT_NE(config.readDiffTool(), std::nullopt);
     EXPECT_NE(config.globalFilePath(), std::nullopt);
-    EXPECT_THAT(calls.steps(), ElementsAre("git_config_set_string", "git_config_get_string_buf",
+    EXPECT_THAT(calls.steps(), ElementsAre("git_config_find_xdg", "git_config_find_global",
+                                           "git_config_set_string", "git_config_get_string_buf",
                                            "git_config_find_global"));
 }
 

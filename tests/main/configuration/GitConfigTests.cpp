@@ -8,6 +8,7 @@
 #include <gtest/gtest.h>
 
 #include "GitConfigFixture.hpp"
+#include "support/Descriptors.hpp"
 #include "support/Failure.hpp"
 #include "support/LogCapture.hpp"
 #include "support/UnprivilegedUser.hpp"
@@ -33,6 +34,11 @@ class GitConfigFile : public GitConfigFixture
   protected:
     GitConfigFile() : installation_("/opt/host")
     {
+    }
+
+    static std::filesystem::perms permissionsOf(const std::filesystem::path &file)
+    {
+        return std::filesystem::status(file).permissions();
     }
 
     const InstallPath installation_;
@@ -188,6 +194,47 @@ TEST_F(GitConfigFile, MayBeALink)
     config.writeDiffTool();
     EXPECT_EQ(shown(config.readDiffTool()), diffToolOfOptHost);
     EXPECT_EQ(byGit("user.name"), "Somebody");
+}
+
+TEST_F(GitConfigFile, KeepsItsModeAsGitDoes)
+{
+    const std::string text = "[user]\n\tname = Somebody\n";
+    const auto byGitItself = folder() / "twin";
+    const auto repository = makeRepository();
+    for (const unsigned mode : {0600U, 0640U, 0644U, 0664U, 0755U, 0400U})
+    {
+        const auto permissions = std::filesystem::perms(mode);
+        for (const auto &file : {global(), byGitItself})
+        {
+            writeFile(file, text);
+            std::filesystem::permissions(file, permissions);
+        }
+        repository.git(
+            {"config", "--file", byGitItself.string(), "difftool.vkDiff.cmd", diffToolOfOptHost});
+        GitConfig config;
+        config.writeDiffTool();
+        EXPECT_EQ(shown(config.readDiffTool()), diffToolOfOptHost);
+        EXPECT_EQ(permissionsOf(global()), permissions);
+        EXPECT_EQ(permissionsOf(global()), permissionsOf(byGitItself));
+    }
+}
+
+TEST_F(GitConfigFile, KeepsItsModeInTheXdgFolderAndBehindALink)
+{
+    const auto secret = std::filesystem::perms(0600);
+    writeFile(folder() / "real", "[user]\n\tname = Somebody\n");
+    std::filesystem::permissions(folder() / "real", secret);
+    for (const auto &link : {global(), xdg()})
+    {
+        std::filesystem::create_directories(link.parent_path());
+        std::filesystem::create_symlink(folder() / "real", link);
+        const NoDescriptorLeak noLeak;
+        GitConfig().writeDiffTool();
+        EXPECT_EQ(byGit("difftool.vkDiff.cmd"), diffToolOfOptHost);
+        EXPECT_EQ(permissionsOf(folder() / "real"), secret);
+        EXPECT_TRUE(std::filesystem::is_symlink(link));
+        std::filesystem::remove(link);
+    }
 }
 
 TEST_F(GitConfigFile, ThatIsLockedOrBrokenIsNotWritten)
