@@ -53,7 +53,12 @@ class VCLINK_GIT_EXPORT GitRemote
     /// Also downloads the tags that point to downloaded objects, and all tags of a repository on
     /// this machine. Keeps remote-tracking branches that the remote has deleted, unless its `prune`
     /// is configured. Does not change the working tree and the index, and changes a local branch
-    /// only if a refspec names it.
+    /// only if a refspec names it. Does not fail if a refspec without '+' would move a reference to
+    /// a commit that is not a descendant; the reference stays.
+    ///
+    /// **Moves a branch even if a working tree has it checked out**, unlike git. The files and the
+    /// index stay, so the next commit undoes what the branch got; with '+' local commits may be in
+    /// the reflog only. Check the targets of given and configured refspecs before the call.
     ///
     /// After a failure or a cancellation some objects may have been downloaded and some references
     /// moved. A cancellation request that ended a fetch also stops the next checkout of the adapter

@@ -150,6 +150,36 @@ TEST_P(Fetch, LeavesBranchesAndFilesAsTheyAre)
     EXPECT_EQ(after, before);
 }
 
+/// git refuses it. The refspecs are the host's and the user's.
+TEST_P(Fetch, MovesABranchThatIsCheckedOutIfARefspecNamesIt)
+{
+    fetch({"refs/heads/main:refs/remotes/origin/main"});
+    repository_.git({"reset", "--quiet", "--hard", "origin/main"});
+    const auto before = stateOf(repository_);
+    const std::string id = publish("file", "changed\n");
+    EXPECT_THAT(repository_.tryGit({"fetch", "origin", "refs/heads/main:refs/heads/main"}).errors,
+                HasSubstr("refusing to fetch into"));
+    fetch({"refs/heads/main:refs/heads/main"});
+    EXPECT_EQ(currentBranch(), "refs/heads/main");
+    EXPECT_EQ(idOf("main"), id);
+    EXPECT_EQ(stateOf(repository_).workingTree, before.workingTree);
+    EXPECT_EQ(stateOf(repository_).index, before.index);
+}
+
+TEST_P(Fetch, LeavesAReferenceThatCannotBeFastForwardedAndDoesNotFail)
+{
+    fetch();
+    repository_.git({"branch", "topic", "origin/main"});
+    repository_.git({"checkout", "--quiet", "topic"});
+    const std::string own = commit("own", "x");
+    repository_.git({"checkout", "--quiet", "--detach"});
+    publish("file", "changed\n");
+    fetch({"refs/heads/main:refs/heads/topic"});
+    EXPECT_EQ(idOf("topic"), own);
+    fetch({"+refs/heads/main:refs/heads/topic"});
+    EXPECT_EQ(idOf("topic"), idOf("main", author_));
+}
+
 /// The reflog of the reference holds libgit2's own words.
 TEST_P(Fetch, TellsItsTransferAndEachReferenceThatItMoves)
 {
