@@ -151,6 +151,8 @@ std::vector<Tolerance> tolerancesOfOthers(const std::string &operation, const st
         {"", "git_pathspec_matches_path", any, any, normal},
         // Without a HEAD the files are taken out of the index.
         {"revert", "git_revparse_single", any, any, normal},
+        // The look for conflicts finds none.
+        {"revert", "git_index_has_conflicts", any, any, normal},
         // The end of a list.
         {"getLocalBranches", "git_branch_next", 1, GIT_ITEROVER, "done: "},
         {"getLocalBranches", "git_branch_next", 2, GIT_ITEROVER, "done: refs/heads/main "},
@@ -166,6 +168,12 @@ std::vector<Tolerance> tolerancesOfOthers(const std::string &operation, const st
         {"mergeFileAndFolder", "git_tree_entry_bypath", 1, GIT_ENOTFOUND,
          failureIn(operation, GIT_ECONFLICT, GIT_ERROR_CHECKOUT,
                    "the folder 'new' is in the way of the checkout")},
+        {"switchBranchOverFolder", "git_tree_entry_bypath", 2, GIT_ENOTFOUND,
+         failureIn(operation, GIT_ECONFLICT, GIT_ERROR_CHECKOUT,
+                   "the folder 'folder/deep' is in a folder that becomes a file")},
+        {"switchBranchOverFolder", "git_tree_entry_bypath", 3, GIT_ENOTFOUND,
+         failureIn(operation, GIT_ECONFLICT, GIT_ERROR_CHECKOUT,
+                   "the file 'folder/deep/inside' is in a folder that becomes a file")},
         {"", "git_tree_entry_bypath", any, GIT_ENOTFOUND, normal},
         // Both sides have added the file then, for all one knows. What the call has given counts.
         {"mergeBesideLock", "git_merge_bases", any, GIT_ENOTFOUND, normal, true},

@@ -139,11 +139,11 @@ void makeLinkedFolder(GitRepository &repository)
 void makeReplacedFolder(GitRepository &repository)
 {
     makePlain(repository);
-    repository.write("sub/deep/inside", "x\n");
+    repository.write("folder/deep/inside", "x\n");
     repository.commitAll("deeper");
     repository.git({"checkout", "--quiet", "-b", "topic"});
-    repository.remove("sub");
-    repository.write("sub", "theirs\n");
+    repository.remove("folder");
+    repository.write("folder", "theirs\n");
     repository.commitAll("on topic");
     repository.git({"checkout", "--quiet", "main"});
 }

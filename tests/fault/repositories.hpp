@@ -32,7 +32,7 @@ void makeTypeChange(GitRepository &repository);
 void makeBranches(GitRepository &repository);
 /// Branches, with an untracked link in the place of "sub", which both branches have.
 void makeLinkedFolder(GitRepository &repository);
-/// Plain with a folder in "sub", and the branch "topic", where "sub" is a file.
+/// Plain with "folder/deep/inside", and the branch "topic", where "folder" is a file.
 void makeReplacedFolder(GitRepository &repository);
 /// Branches, with main where "topic" is.
 void makeUpToDate(GitRepository &repository);
