@@ -15,12 +15,14 @@ STYLE = """
 text { font: 13px system-ui, sans-serif; fill: #24292f; }
 .title { font-size: 15px; font-weight: 600; }
 .value { font-size: 12px; }
+.page { fill: #ffffff; }
 .axis { stroke: #d0d7de; }
 .library { fill: #0969da; }
 .libgit2 { fill: #bc4c00; }
 .git { fill: #6e7781; }
 @media (prefers-color-scheme: dark) {
   text { fill: #e6edf3; }
+  .page { fill: #0d1117; }
   .axis { stroke: #3d444d; }
   .library { fill: #4493f8; }
   .libgit2 { fill: #f0883e; }
@@ -84,6 +86,8 @@ def draw(rows, title):
         f'<svg xmlns="http://www.w3.org/2000/svg" viewBox="0 0 {WIDTH} {bottom + 46}" '
         f'width="{WIDTH}" height="{bottom + 46}" role="img" aria-label="{title}. {said}.">',
         f"<style>{STYLE}</style>",
+        # Of its own, because a page may not have the colour scheme of the system.
+        '<rect class="page" width="100%" height="100%" rx="6"/>',
         f'<text class="title" x="{LEFT}" y="22">{title}</text>',
         *legend(), *axis(scale, bottom), *bars(rows, scale),
         f'<text class="value" x="{LEFT}" y="{bottom + 36}">milliseconds, logarithmic scale; '
