@@ -39,8 +39,8 @@ constexpr Translation refusalRows[] = {
      "%1% ist jetzt eine Datei: Räumen Sie sie aus dem Weg, oder verwerfen Sie sie auch",
      "%1% は今はファイルです。別の場所に移すか、一緒に元に戻してください"},
     {"it is in conflict: edit it until it is right, then mark it with \"vclink-shell resolved\"",
-     "sie steht in Konflikt: Bearbeiten Sie sie, bis sie richtig ist, und markieren Sie sie "
-     "mit\n\"vclink-shell resolved\"",
+     "sie steht in Konflikt: Bearbeiten Sie sie, bis sie richtig ist, und markieren Sie sie dann "
+     "mit \"vclink-shell resolved\"",
      "競合しています。正しく編集し、\"vclink-shell resolved\" で解決済みにしてください"},
     {"it is gone from the disk, and from the next commit",
      "sie ist von der Platte verschwunden und fehlt im nächsten Commit",
@@ -217,8 +217,8 @@ constexpr Translation refusalRows[] = {
     {"The states of the files are not known: .gitmodules is in conflict, and can't be read before "
      "it\nis resolved. Edit it, and mark it with \"vclink-shell resolved\".",
      "Die Zustände der Dateien sind nicht bekannt: .gitmodules steht in Konflikt und kann nicht "
-     "gelesen\nwerden, bevor er gelöst ist. Bearbeiten Sie die Datei, und markieren Sie sie "
-     "mit\n\"vclink-shell resolved\".",
+     "gelesen\nwerden, bevor er gelöst ist. Bearbeiten Sie die Datei, und markieren Sie sie dann "
+     "mit \"vclink-shell resolved\".",
      "ファイルの状態がわかりません。.gitmodules "
      "が競合していて、解決するまで読み取れません。編集して、\n\"vclink-shell resolved\" "
      "で解決済みにしてください。"},

@@ -26,9 +26,8 @@ TEST_F(ShellChangeFailures, AreToldInTheLanguageThatWasAskedFor)
         std::string japanese;
     } cases[] = {
         {{"add", "a"},
-         "Es wurde nichts hinzugefügt, denn diese Dateien sind für Git nicht neu:\n" + file,
-         "次のファイルは Git にとって新しいファイルではないため、何も追加されませんでした。\n" +
-             file},
+         "Nichts wurde hinzugefügt:\n  a: sie steht in Konflikt: ",
+         "何も追加されませんでした:\n  a: 競合しています。"},
         {{"rm", "b"},
          "Es gibt keine Dateien zu entfernen. Es wurde nichts geändert.\n",
          "削除するファイルがありません。何も変更されていません。\n"},

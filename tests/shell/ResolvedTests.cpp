@@ -64,11 +64,10 @@ TEST_F(ShellResolved, RefusesANameThatMeansFilesThatWereNotNamed)
 {
     repository_.write("[ab]", "");
     repository_.write("b", "edited\n");
-    EXPECT_EQ(
-        refuse({"resolved", "[ab]"}),
-        "Nothing was marked as resolved.\nA name with *, ? or [ is a pattern, and means these "
-        "files too:\n  b\nName them as well if you mean them, or use git for the file with that "
-        "name.\n");
+    EXPECT_EQ(refuse({"resolved", "[ab]"}),
+              "Nothing was marked as resolved.\nA name with *, ? or [ is a pattern, and matches "
+              "these files too:\n  b\nName them as well if you want them, or use git for the file "
+              "with that name.\n");
 }
 
 } // namespace
