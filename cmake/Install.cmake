@@ -18,7 +18,7 @@ install(FILES README.md CHANGELOG.md SECURITY.md
 install(DIRECTORY docs
     DESTINATION share/doc/libvclink-git-dev
     COMPONENT development
-    FILES_MATCHING PATTERN "*.md" PATTERN "*.png")
+    FILES_MATCHING PATTERN "*.md" PATTERN "*.png" PATTERN "*.svg")
 if(VCLINK_API_PAGES)
     include(cmake/ApiPages.cmake)
 endif()

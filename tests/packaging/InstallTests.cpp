@@ -104,7 +104,7 @@ TEST_F(Component, DevelopmentIsTheExportedHeadersWhatFindsTheLibraryAndTheDocume
     for (const auto &name : filesBelow(VCLINK_SOURCE_FOLDER "/docs"))
     {
         const auto extension = std::filesystem::path(name).extension();
-        if (extension == ".md" || extension == ".png")
+        if (extension == ".md" || extension == ".png" || extension == ".svg")
         {
             expected.push_back(documents + "docs/" + name);
         }
