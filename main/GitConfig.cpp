@@ -5,6 +5,8 @@
 
 #include <git2/buffer.h>
 #include <git2/config.h>
+#include <git2/deprecated.h> // LIBGIT2_VER_MAJOR, of which 1.8 has made another name
+#include <git2/version.h>
 
 #include "error/errorUtil/GitResult.hpp"
 #include "error/errorUtil/gitString.hpp"
@@ -18,6 +20,11 @@ namespace vclink::git
 {
 namespace
 {
+
+/// If a file can no longer be read or parsed, a look-up frees an entry that it has not found, which
+/// ends the process.
+constexpr bool endsAtBrokenFiles = LIBGIT2_VER_MAJOR > 1 ||
+                                   (LIBGIT2_VER_MAJOR == 1 && LIBGIT2_VER_MINOR >= 8);
 
 /// A buffer that libgit2 fills.
 class Buffer
@@ -49,14 +56,29 @@ class Buffer
 };
 
 /// Intentionally treats a failure as no value.
-std::optional<ustring> read(git_config *config, const ConfigKey &key)
+std::optional<ustring> readText(git_config *config, const std::string &key)
 {
     Buffer value;
-    if (git_config_get_string_buf(value.get(), config, configKeyString(key).c_str()) != 0)
+    if (git_config_get_string_buf(value.get(), config, key.c_str()) != 0)
     {
         return std::nullopt;
     }
     return value.text();
+}
+
+std::optional<ustring> read(git_config *config, const ConfigKey &key)
+{
+    if constexpr (endsAtBrokenFiles)
+    {
+        // A snapshot reads the files itself, and reports a failure.
+        const auto snapshot = acquire<git_config>(git_config_snapshot, config);
+        return snapshot.has_error() ? std::nullopt
+                                    : readText(snapshot.value().get(), configKeyString(key));
+    }
+    else
+    {
+        return readText(config, configKeyString(key));
+    }
 }
 
 /// Returns an empty path if the file does not exist.

@@ -208,6 +208,7 @@ std::vector<Tolerance> tolerancesOfOthers(const std::string &operation, const st
         // No value is what the reads of the configuration make of every failure.
         {"globalFilePath", "git_config_find_global", any, any, "done: nothing"},
         {"read", "git_config_get_string_buf", any, any, "done: nothing"},
+        {"read", "git_config_snapshot", any, any, "done: nothing"},
         // Only the mode of the file is not kept then.
         {"write", "git_config_find_xdg", any, any, normal},
         {"write", "git_config_find_global", any, any, normal},

@@ -23,6 +23,9 @@ constexpr bool isSince(int major, int minor)
 /// configuration.
 constexpr bool losesMemory = !isSince(1, 6);
 
+/// Looking up a value in a file that was broken after it was opened ends the process.
+constexpr bool endsAtBrokenFiles = isSince(1, 8);
+
 /// GIT_CHECKOUT_SAFE. 0 is the dry run before.
 constexpr unsigned safeCheckout = isSince(1, 9) ? 0 : 1;
 

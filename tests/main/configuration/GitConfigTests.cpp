@@ -250,6 +250,17 @@ TEST_F(GitConfigFile, ThatIsLockedOrBrokenIsNotWritten)
     EXPECT_EQ(read(global()), "[broken\n");
 }
 
+TEST_F(GitConfigFile, ThatIsBrokenWhileItIsOpenHasNoValues)
+{
+    writeFile(global(), "[difftool \"vkDiff\"]\n\tcmd = mine\n");
+    const GitConfig config;
+    ASSERT_NE(config.readDiffTool(), std::nullopt);
+    writeFile(global(), "[broken\n");
+    EXPECT_EQ(config.readAutoMergeDriver(), std::nullopt);
+    EXPECT_EQ(config.readDiffTool(), std::nullopt);
+    EXPECT_EQ(config.readMergeTool(), std::nullopt);
+}
+
 TEST_F(GitConfigFile, InAFolderThatCannotBeWrittenIsNotWritten)
 {
     writeFile(global(), "[user]\n\tname = Somebody\n");
