@@ -85,7 +85,7 @@ std::optional<ustring> read(git_config *config, const ConfigKey &key)
 std::string pathFrom(int (*find)(git_buf *))
 {
     Buffer path;
-    return find(path.get()) == 0 ? path.bytes() : std::string();
+    return call(find, path.get()).has_value() ? path.bytes() : std::string();
 }
 
 void write(git_config *config, const ToolCommand &tool)

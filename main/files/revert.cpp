@@ -92,8 +92,7 @@ void resetToHead(git_repository *repository, const git_object *head, const Paths
     raise(shared_vclink::git::Conflicted(vclink::util::generateFileReport(std::move(files))));
 }
 
-/// Raises if one of the listed files is in conflict. The states do not say so if they could
-/// not be read, or if another process has merged since.
+/// Raises if one of the listed files is in conflict.
 void refuseConflicts(git_index *index, const PathspecArray &pathspec, const upath &root)
 {
     if (git_index_has_conflicts(index) == 0)
@@ -119,12 +118,17 @@ void refuseConflicts(git_index *index, const PathspecArray &pathspec, const upat
 }
 
 void resetEntries(git_repository *repository, const git_object *head, const PathspecArray &pathspec,
-                  const std::vector<std::string> &names, const upath &root)
+                  const FileStateMap &states, const upath &root)
 {
     // The index of the resets and the checkout. Without this call it would be empty if libgit2
     // cannot read the index file, and would then have only these entries.
     const OwnedHandle<git_index> index = getRepositoryIndex(repository);
-    refuseConflicts(index.get(), pathspec, root);
+    // Without states, because they could not be read, none was in conflict.
+    if (states.empty())
+    {
+        refuseConflicts(index.get(), pathspec, root);
+    }
+    const std::vector<std::string> names = changedNames(states, root);
     resetToHead(repository, head, pathspec, names.size());
     // If a file became a link in the index, or a link a file, the first reset removes it from the
     // index and the second one restores it.
@@ -170,9 +174,8 @@ void GitAdapter::revertFiles(const std::vector<upath> &files)
     IndexLock lock(repository.get());
     // Without a HEAD the reset removes the paths from the index.
     const GitResult<OwnedHandle<git_object>> head = revparseObject(repository.get(), "HEAD");
-    const std::vector<std::string> names = changedNames(states, root_);
-    resetEntries(repository.get(), head.has_value() ? head.value().get() : nullptr, pathspec, names,
-                 root_);
+    resetEntries(repository.get(), head.has_value() ? head.value().get() : nullptr, pathspec,
+                 states, root_);
     const std::shared_ptr<GitOptionsFactory> factory = optionsFactory_;
     CheckoutOptions options = factory->makeCheckoutOptions();
     options.checkoutStrategy = GIT_CHECKOUT_FORCE | GIT_CHECKOUT_RECREATE_MISSING;

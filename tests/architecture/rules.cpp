@@ -50,7 +50,7 @@ const std::vector<Room> &rooms()
         {"main/files", {"main/checkout", "main/mergeState"}},
         {"main/merge", {"main/checkout", "main/files", "main/mergeState"}},
         {"main/remote", {"main/files"}},
-        {"main", {"main/checkout", "main/files", "main/merge", "main/remote"}}};
+        {"main", {"main/checkout", "main/files", "main/merge", "main/mergeState", "main/remote"}}};
     return table;
 }
 

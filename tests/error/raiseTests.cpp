@@ -5,6 +5,7 @@
 #include <stdexcept>
 #include <string>
 #include <typeinfo>
+#include <utility>
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
@@ -67,11 +68,11 @@ TYPED_TEST(Raise, ThrowsTheTagsOwnExceptionOutsideAHandlerWithATextThatEveryBase
 }
 
 /// What std::throw_with_nested throws; each standard library has its own name for it.
-template <class Exception> const std::type_info &nestedType(const Exception &exception)
+template <class Exception> const std::type_info &nestedType(Exception exception)
 {
     try
     {
-        std::throw_with_nested(exception);
+        std::throw_with_nested(std::move(exception));
     }
     catch (const Exception &thrown)
     {
