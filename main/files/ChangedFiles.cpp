@@ -197,7 +197,7 @@ bool isEmptyBlob(const git_oid &id) noexcept
 bool isForAttributes(const std::string &path) noexcept
 {
     // A file system may ignore case.
-    return ::strcasecmp(path.c_str() + path.rfind('/') + 1, ".gitattributes") == 0;
+    return ::strcasecmp(path.c_str() + (path.rfind('/') + 1), ".gitattributes") == 0;
 }
 
 } // namespace vclink::git
