@@ -12,6 +12,7 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
+#include "error/errorUtil/libgit2Errors.hpp"
 #include "main/files/indexRefresh.hpp"
 #include "main/files/stageChangedFiles.hpp"
 #include "quoting.hpp"
