@@ -11,11 +11,11 @@
 #include "error/errorUtil/GitResult.hpp"
 #include "error/errorUtil/callbackException.hpp"
 #include "error/errorUtil/libgit2Errors.hpp"
-#include "main/checkout/MergeBases.hpp"
 #include "main/checkout/RenamesToFolders.hpp"
 #include "main/checkout/conflictLocks.hpp"
 #include "main/checkout/gitlinks.hpp"
 #include "main/checkout/obstaclesAhead.hpp"
+#include "main/mergeState/MergeBases.hpp"
 #include "util/repository/repository.hpp"
 
 namespace vclink::git

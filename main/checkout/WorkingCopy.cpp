@@ -50,6 +50,13 @@ int accessError(const std::string &folder)
 
 } // namespace
 
+bool isHidden(const git_index_entry &entry) noexcept
+{
+    return ((entry.flags & GIT_INDEX_ENTRY_VALID) != 0 ||
+            (entry.flags_extended & GIT_INDEX_ENTRY_SKIP_WORKTREE) != 0) &&
+           entry.mode != GIT_FILEMODE_COMMIT;
+}
+
 WorkingCopy::WorkingCopy(git_repository *repository)
     : repository_(repository), root_(workdirOf(repository)), index_(getRepositoryIndex(repository)),
       hasIndex_(standingAt(git_index_path(index_.get())) != Standing::Nothing), path_(root_)
@@ -146,6 +153,7 @@ void WorkingCopy::forget()
     wayToFolder_ = nullptr;
     asked_.clear();
     examined_.reset();
+    hasHidden_.reset();
 }
 
 WorkingCopy::Way WorkingCopy::wayInto(const std::string &folder, const Way &above) const
@@ -246,6 +254,20 @@ const git_index_entry *WorkingCopy::findEntry(const char *name)
                          std::strcmp(entry->path, name) == 0;
     place_ = isFound ? first + 1 : first;
     return isFound ? entry : git_index_get_bypath(index, name, GIT_INDEX_STAGE_NORMAL);
+}
+
+bool WorkingCopy::hasHidden()
+{
+    if (!hasHidden_)
+    {
+        std::size_t place = git_index_entrycount(index_.get());
+        while (place > 0 && !isHidden(*git_index_get_byindex(index_.get(), place - 1)))
+        {
+            --place;
+        }
+        hasHidden_ = place > 0;
+    }
+    return *hasHidden_;
 }
 
 bool WorkingCopy::hasEntryBelow(const std::string &folder) const

@@ -18,6 +18,9 @@
 namespace vclink::git
 {
 
+/// Returns true if Git hides changes of the entry's file.
+bool isHidden(const git_index_entry &entry) noexcept;
+
 /// The working tree, the index and HEAD's tree, for the rules of a checkout. Names are relative to
 /// the root. Each operation throws LibGit2Exception if it cannot find out.
 class WorkingCopy
@@ -67,6 +70,9 @@ class WorkingCopy
     /// Returns the index's entry, null if there is none without a conflict. Remembers the last one,
     /// since several rules ask for it.
     const git_index_entry *entryOf(const std::string &name);
+
+    /// Returns true if isHidden holds for an entry of the index. Remembers it.
+    [[nodiscard]] bool hasHidden();
 
     /// Returns true if the index has anything below a folder of this name.
     [[nodiscard]] bool hasEntryBelow(const std::string &folder) const;
@@ -122,6 +128,7 @@ class WorkingCopy
     const git_index_entry *entry_ = nullptr;
     /// Where the last search in the index ended.
     std::size_t place_ = 0;
+    std::optional<bool> hasHidden_;
     /// The root, and a name.
     std::string path_;
     /// The folder that was examined last, and what came out.

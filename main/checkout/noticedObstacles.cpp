@@ -135,7 +135,7 @@ Finding findSubmoduleNoticed(WorkingCopy &copy, const CheckoutNotice &notice)
 Finding findHiddenEditNoticed(WorkingCopy &copy, const CheckoutNotice &notice)
 {
     if (!makesFile(notice) || notice.baseline == nullptr || notice.workdir == nullptr ||
-        isFolder(notice.workdir))
+        isFolder(notice.workdir) || !copy.hasHidden())
     {
         return {};
     }

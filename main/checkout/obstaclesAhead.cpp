@@ -277,6 +277,10 @@ bool isDeletedByBoth(WorkingCopy &copy, const TreeChange &change)
 
 Finding findHiddenEdit(WorkingCopy &copy)
 {
+    if (!copy.hasHidden())
+    {
+        return {};
+    }
     const std::size_t count = git_index_entrycount(copy.index());
     for (std::size_t i = 0; i < count; ++i)
     {
@@ -297,13 +301,6 @@ Obstacle hiddenEdit(const git_index_entry &entry)
     return {name, "the changes of '" + name + "' would be lost in the merge. Git hides them, " +
                       "because the file is marked " + option + ": take the mark away with " +
                       "'git update-index --no-" + option + "' and commit, or remove the file"};
-}
-
-bool isHidden(const git_index_entry &entry) noexcept
-{
-    return ((entry.flags & GIT_INDEX_ENTRY_VALID) != 0 ||
-            (entry.flags_extended & GIT_INDEX_ENTRY_SKIP_WORKTREE) != 0) &&
-           entry.mode != GIT_FILEMODE_COMMIT;
 }
 
 } // namespace vclink::git

@@ -86,7 +86,4 @@ Finding findHiddenEdit(WorkingCopy &copy);
 
 /// Returns the obstacle of findHiddenEdit for an entry with a change.
 Obstacle hiddenEdit(const git_index_entry &entry);
-/// Returns true if Git hides changes of the entry's file.
-bool isHidden(const git_index_entry &entry) noexcept;
-
 } // namespace vclink::git

@@ -116,9 +116,9 @@ class Look
 
     std::optional<ChangedFile> at(const git_index_entry &entry)
     {
-        const bool isSamePath = last_ == entry.path;
-        dependOnOrder_ = dependOnOrder_ || (isSamePath && isLastNormal_);
-        last_ = entry.path;
+        const std::string_view path = entry.path;
+        dependOnOrder_ = dependOnOrder_ || (isLastNormal_ && path == last_);
+        last_ = path;
         isLastNormal_ = GIT_INDEX_ENTRY_STAGE(&entry) == GIT_INDEX_STAGE_NORMAL;
         if (!isLastNormal_)
         {
@@ -138,7 +138,7 @@ class Look
     std::optional<ChangedFile> compare(const git_index_entry &entry)
     {
         struct stat status = {};
-        path_.replace(rootSize_, std::string::npos, entry.path);
+        path_.replace(rootSize_, std::string::npos, last_);
         const int error = readStatus(path_, status);
         if (error == ENOENT || error == ENOTDIR)
         {

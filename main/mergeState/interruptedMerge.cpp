@@ -1,18 +1,19 @@
 // SPDX-License-Identifier: MIT
 #include "main/mergeState/interruptedMerge.hpp"
 
+#include <algorithm>
 #include <array>
 #include <cerrno>
 #include <cstddef>
 #include <memory>
 #include <string>
+#include <vector>
 
 #include <fcntl.h>
 #include <git2/commit.h>
 #include <git2/diff.h>
 #include <git2/errors.h>
 #include <git2/index.h>
-#include <git2/merge.h>
 #include <git2/oid.h>
 #include <git2/repository.h>
 #include <git2/tree.h>
@@ -23,6 +24,7 @@
 #include "error/errorUtil/callbackException.hpp"
 #include "error/errorUtil/raiseGitError.hpp"
 #include "error/errorUtil/raiseSystemError.hpp"
+#include "main/mergeState/MergeBases.hpp"
 #include "main/mergeState/MergeMarker.hpp"
 #include "util/repository/objectIds.hpp"
 #include "util/repository/repository.hpp"
@@ -78,19 +80,23 @@ OwnedHandle<git_tree> treeOf(const git_commit *commit)
     return acquire<git_tree>(git_commit_tree, commit).value();
 }
 
-/// Returns the tree with which both sides began, null if they have nothing in common.
-OwnedHandle<git_tree> findBase(git_repository *repository, const git_commit *ours,
-                               const git_commit *theirs)
+/// Returns the trees with which both sides began, one that is null if they have nothing in common.
+std::vector<OwnedHandle<git_tree>> findBases(git_repository *repository, const git_commit *ours,
+                                             const git_commit *theirs)
 {
-    git_oid id{};
-    const GitResult<void> found =
-        call(git_merge_base, &id, repository, git_commit_id(ours), git_commit_id(theirs));
-    if (found.has_error() && found.error().getCode() == GIT_ENOTFOUND)
+    const MergeBases bases(repository, git_commit_id(ours), git_commit_id(theirs));
+    std::vector<OwnedHandle<git_tree>> trees;
+    trees.reserve(bases.size() + 1);
+    for (std::size_t i = 0; i < bases.size(); ++i)
     {
-        return nullptr;
+        trees.push_back(
+            treeOf(acquire<git_commit>(git_commit_lookup, repository, bases.at(i)).value().get()));
     }
-    found.value();
-    return treeOf(acquire<git_commit>(git_commit_lookup, repository, &id).value().get());
+    if (trees.empty())
+    {
+        trees.push_back(nullptr);
+    }
+    return trees;
 }
 
 /// A file of a tree or an index. The mode is 0 if it does not exist.
@@ -128,11 +134,21 @@ File findInIndex(git_index *index, const char *path)
 /// Searches the changes of theirs for one that ours has not touched.
 struct Search
 {
+    const std::vector<OwnedHandle<git_tree>> &bases;
     const git_tree *ours;
     git_index *index;
     bool isOneSided = false;
     bool isTaken = false;
 };
+
+/// Returns true if the file is in ours as in all bases. Where these differ, a merge can decide for
+/// ours.
+bool isUntouched(const Search &search, const char *path, const File &before, const File &ours)
+{
+    return before == ours && std::all_of(search.bases.begin() + 1, search.bases.end(),
+                                         [&](const OwnedHandle<git_tree> &base)
+                                         { return findInTree(base.get(), path) == ours; });
+}
 
 /// Keeps no delta, and ends the comparison when the answer is known.
 int lookAt(const git_diff * /*diff*/, const git_diff_delta *delta, const char * /*pathspec*/,
@@ -145,7 +161,7 @@ int lookAt(const git_diff * /*diff*/, const git_diff_delta *delta, const char * 
         const char *const path = delta->new_file.path;
         const File before{delta->old_file.id, delta->old_file.mode};
         const File ours = findInTree(search.ours, path);
-        if (before == ours)
+        if (isUntouched(search, path, before, ours))
         {
             search.isOneSided = true;
             search.isTaken = !(findInIndex(search.index, path) == ours);
@@ -161,18 +177,18 @@ int lookAt(const git_diff * /*diff*/, const git_diff_delta *delta, const char * 
 /// Returns true if only theirs has changed some files, and the index has none of these changes.
 bool isNothingTaken(git_repository *repository, const git_commit *ours, const git_commit *theirs)
 {
-    const OwnedHandle<git_tree> base = findBase(repository, ours, theirs);
+    const std::vector<OwnedHandle<git_tree>> bases = findBases(repository, ours, theirs);
     const OwnedHandle<git_tree> oursTree = treeOf(ours);
     const OwnedHandle<git_tree> theirsTree = treeOf(theirs);
     const OwnedHandle<git_index> index = getRepositoryIndex(repository);
-    Search search{oursTree.get(), index.get()};
+    Search search{bases, oursTree.get(), index.get()};
     git_diff_options options{};
     check(git_diff_options_init, &options, unsigned{GIT_DIFF_OPTIONS_VERSION});
     options.notify_cb = lookAt;
     options.payload = &search;
     git_diff *raw = nullptr;
-    const GitResult<void> compared =
-        call(git_diff_tree_to_tree, &raw, repository, base.get(), theirsTree.get(), &options);
+    const GitResult<void> compared = call(git_diff_tree_to_tree, &raw, repository,
+                                          bases.front().get(), theirsTree.get(), &options);
     const std::unique_ptr<git_diff, void (*)(git_diff *)> diff(raw, git_diff_free);
     if (search.isTaken)
     {

@@ -188,8 +188,6 @@ std::vector<Tolerance> tolerancesOfOthers(const std::string &operation, const st
         {"merge", "git_repository_state", 1, any, badState},
         {"merge", "git_repository_state", 2, any, badState},
         {"merge", "git_repository_state", 3, any, isOtherMerge},
-        // The index has what only the other side has changed, from wherever both began.
-        {"merge", "git_merge_base", any, GIT_ENOTFOUND, normal},
         // The library ends the comparison itself as soon as it has seen something of that.
         {"mergeThreeWay", "git_diff_tree_to_tree", any, any, normal, true},
         {"mergeBesideHidden", "git_diff_tree_to_tree", any, any, normal, true},

@@ -133,6 +133,20 @@ TEST_F(ThreeWayMerge, OfCrissCrossHistoriesIsAsInGit)
     expectCleanAsGit();
 }
 
+TEST_F(ThreeWayMerge, OfCrissCrossHistoriesCanTakeNothingOfTheirs)
+{
+    makeDiverged();
+    const auto change = writing("file", "the same\n");
+    const auto changeWithoutNew = [this, &change]
+    {
+        change();
+        repository_.remove("ours");
+        repository_.remove("theirs");
+    };
+    crissCross(changeWithoutNew, change);
+    expectCleanAsGit();
+}
+
 TEST_F(ThreeWayMerge, WithAnOctopusAmongTheAncestorsIsAsInGitAndOfItsBranchesDoesNothing)
 {
     for (const std::string name : {"one", "two", "three"})
