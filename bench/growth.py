@@ -4,11 +4,9 @@
 git, on a memory file system and on disk. scripts/bench --growth calls it."""
 
 import argparse
-import datetime
 import os
 import shutil
 import statistics
-import subprocess
 import sys
 import tempfile
 
@@ -17,7 +15,7 @@ from branches import Operation
 from changes import Change
 from chart import draw
 from programs import Programs
-from report import Table, exponent, write_into
+from report import Table, exponent, output_of, system, versions, write_into
 
 SIZES = (1_000, 5_000, 20_000)
 ROUNDS = 3
@@ -108,10 +106,6 @@ def table_of(where, taken):
     return table
 
 
-def output_of(*command):
-    return subprocess.run(command, capture_output=True, text=True, check=True).stdout.strip()
-
-
 def processor():
     with open("/proc/cpuinfo", encoding="utf-8") as file:
         models = [line.split(":")[1].strip() for line in file if line.startswith("model name")]
@@ -119,12 +113,18 @@ def processor():
 
 
 def describe(disk):
-    return (f"{datetime.date.today()}, commit {output_of('git', 'rev-parse', '--short', 'HEAD')}, "
-            f"libgit2 {output_of('pkg-config', '--modversion', 'libgit2')}, "
-            f"{output_of('git', '--version')}, {processor()}, "
+    return (f"{versions()}, {processor()}, "
             f"load {os.getloadavg()[2]:.1f} at the end. Disk: {disk}. Processor time, median of {ROUNDS} "
             f"runs in turn. One file in {CONCERNED} is concerned: listed, added, removed, reverted, "
             f"committed, or different on the other branch.")
+
+
+def draw_chart(path, taken):
+    size = SIZES[-1]
+    rows = [(TITLES[name], taken[name, size]) for name in CHART]
+    with open(path, "w", encoding="utf-8") as file:
+        file.write(draw(
+            rows, f"Processor time in a working copy of {size:,} files on disk, {system()}"))
 
 
 def main():
@@ -144,14 +144,12 @@ def main():
     finally:
         shutil.rmtree(scratch["in memory"])
     disk = output_of("findmnt", "--noheadings", "--output=FSTYPE", "--target", options.scratch)
-    text = "\n\n".join([describe(disk), *(str(table_of(where, taken[where])) for where in taken)])
-    print(text)
-    if options.page:
-        write_into(options.page, text, "growth")
-        size = SIZES[-1]
-        rows = [(TITLES[name], taken["on disk"][name, size]) for name in CHART]
-        with open(os.path.splitext(options.page)[0] + ".svg", "w", encoding="utf-8") as file:
-            file.write(draw(rows, f"Processor time in a working copy of {size:,} files on disk"))
+    description = describe(disk)
+    tables = [table_of(where, taken[where]) for where in taken]
+    print("\n\n".join([description, *map(str, tables)]))
+    # The chart shows the first system of the tables.
+    if options.page and write_into(options.page, description, tables, "growth")[0] == system():
+        draw_chart(os.path.splitext(options.page)[0] + ".svg", taken["on disk"])
     return 0
 
 

@@ -7,7 +7,6 @@ import concurrent.futures
 import contextlib
 import os
 import platform
-import subprocess
 import sys
 
 import working_copies
@@ -16,7 +15,7 @@ from changes import ChangeBench
 from commits import CommitBench
 from programs import COUNTS, Programs, Ratios
 from remotes import RemoteBench
-from report import Table, write_into
+from report import Table, versions, write_into
 
 SIZES = {1_000: 31, 10_000: 15, 100_000: 7}  # files: rounds of paired runs
 LISTS = (100, 1_000)
@@ -216,17 +215,9 @@ class Bench:
         return table
 
 
-def first_line(*command):
-    return subprocess.run(command, capture_output=True, text=True,
-                          check=True).stdout.splitlines()[0]
-
-
 def describe(root_length):
-    libgit2 = first_line("pkg-config", "--modversion", "libgit2")
-    compiler = first_line("g++", "-dumpfullversion")
-    git = first_line("git", "--version").split()[-1]
-    return (f"libgit2 {libgit2}, gcc {compiler}, git {git}, {platform.machine()}. Paths of 40 "
-            f"characters below a root of {root_length}, all files clean. Instructions and "
+    return (f"{versions()}, {platform.machine()}. Paths of 40 characters below a root of "
+            f"{root_length}, all files clean. Instructions and "
             f"allocations are those of the call; times are ratios of runs in turn, the median "
             f"(smallest–largest).")
 
@@ -251,10 +242,10 @@ def main():
             print(f"== {what}", file=sys.stderr, flush=True)
             step()
     tables = bench.tables()
-    text = "\n\n".join([describe(len(options.scratch) + 2), *map(str, tables)])
-    print(text)
+    description = describe(len(options.scratch) + 2)
+    print("\n\n".join([description, *map(str, tables)]))
     if options.page:
-        write_into(options.page, text)
+        write_into(options.page, description, tables)
     failed = [what for table in tables for what in table.failed]
     print(f"\nbench: {'over the limit: ' + '; '.join(failed) if failed else 'within all limits'}",
           file=sys.stderr)

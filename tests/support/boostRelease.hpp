@@ -1,0 +1,19 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <boost/version.hpp>
+
+/// The differences between releases of Boost on which tests depend, a line for each.
+namespace vclink::test::boost_release
+{
+
+constexpr bool isSince(int major, int minor)
+{
+    return BOOST_VERSION >= major * 100000 + minor * 100;
+}
+
+/// A result of Outcome has an error beside its value, made by default. Later releases keep both in
+/// one place.
+constexpr bool keepsErrorBesideValue = !isSince(1, 76);
+
+} // namespace vclink::test::boost_release
