@@ -35,4 +35,11 @@ inline bool emptyDriverEndsMerge()
     return !isSince(2, 42);
 }
 
+/// A folder with nothing but ignored files is deleted if a file comes in its place. Earlier
+/// releases refuse. 2.39 and 2.47 were tried.
+inline bool deletesIgnoredFolders()
+{
+    return isSince(2, 47);
+}
+
 } // namespace vclink::test::git_release

@@ -3,6 +3,8 @@
 
 #include <algorithm>
 
+#include "support/gitRelease.hpp"
+
 namespace vclink::test
 {
 namespace
@@ -22,22 +24,27 @@ bool means(const std::string &pattern, const std::string &text)
     return text.compare(0, pattern.size() - 1, pattern, 0, pattern.size() - 1) == 0;
 }
 
-} // namespace
-
-bool SurroundingDifference::explains(const Comparand &comparand) const
+/// Differences from some releases of git only.
+std::vector<SurroundingDifference> differencesByRelease()
 {
-    return isAbout(comparand) && (obstacles.empty() || holds(obstacles, comparand.obstacle)) &&
-           git == comparand.git && library == comparand.library;
-}
-
-bool SurroundingDifference::isAbout(const Comparand &comparand) const
-{
-    return holds(operations, comparand.operation) && means(place, comparand.place) &&
-           (comparand.hasSiblings || !isOfSiblings);
+    if (!git_release::deletesIgnoredFolders())
+        return {};
+    return {{{"merge", "switch", "fastForward"},
+             {"ignored file", "ignored link", "ignored folder", "folder with ignored files"},
+             "in a *",
+             "goes through",
+             "refuses",
+             "git deletes what is ignored below a folder that becomes a file"},
+            {{"merge", "switch"},
+             {"folder with ignored files"},
+             "a new file*",
+             "goes through",
+             "refuses",
+             "git deletes a folder with ignored files if a file comes in its place"}};
 }
 
 // One table. NOLINTNEXTLINE(readability-function-size)
-const std::vector<SurroundingDifference> &surroundingDifferences()
+std::vector<SurroundingDifference> differencesFromAnyGit()
 {
     const std::string through = "goes through";
     const std::string refusal = "refuses";
@@ -60,7 +67,7 @@ const std::vector<SurroundingDifference> &surroundingDifferences()
     const Names movedOrAdded{"merge into moved submodules", "merge into added submodules"};
     const Names otherKinds{"file in the submodule's place", "link in the submodule's place",
                            "pipe in the submodule's place"};
-    static const std::vector<SurroundingDifference> differences{
+    return {
         // The library refuses, though git goes on.
         {unfoldedMerge,
          {"file in the folder's place", "folder missing"},
@@ -451,6 +458,31 @@ const std::vector<SurroundingDifference> &surroundingDifferences()
          otherwise,
          "a revert takes the mark away"},
     };
+}
+
+} // namespace
+
+bool SurroundingDifference::explains(const Comparand &comparand) const
+{
+    return isAbout(comparand) && (obstacles.empty() || holds(obstacles, comparand.obstacle)) &&
+           git == comparand.git && library == comparand.library;
+}
+
+bool SurroundingDifference::isAbout(const Comparand &comparand) const
+{
+    return holds(operations, comparand.operation) && means(place, comparand.place) &&
+           (comparand.hasSiblings || !isOfSiblings);
+}
+
+const std::vector<SurroundingDifference> &surroundingDifferences()
+{
+    static const auto differences = []
+    {
+        auto all = differencesFromAnyGit();
+        const auto some = differencesByRelease();
+        all.insert(all.end(), some.begin(), some.end());
+        return all;
+    }();
     return differences;
 }
 
