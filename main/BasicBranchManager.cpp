@@ -23,6 +23,7 @@
 #include "util/lock/PackedReferences.hpp"
 #include "util/lock/referenceLocks.hpp"
 #include "util/repository/objectIds.hpp"
+#include "util/repository/reflogAccess.hpp"
 #include "util/repository/repository.hpp"
 #include "util/scope/KeptMode.hpp"
 
@@ -94,6 +95,25 @@ void refuseCheckedOutElsewhere(const git_reference *branch)
     }
 }
 
+/// Refuses the files of another reference: a tag, refs/stash or a remote's branch can have the
+/// branch's short name, and come first where names are looked up.
+void refuseOtherReference(const git_reference *branch, const git_object *target,
+                          const std::string &name)
+{
+    const OwnedHandle<git_object> commit =
+        acquire<git_object>(git_reference_peel, branch, GIT_OBJECT_COMMIT).value();
+    const auto found = acquire<git_object>(git_object_peel, target, GIT_OBJECT_COMMIT);
+    const bool isSame = found.has_value() &&
+                        isSameId(*git_object_id(commit.get()), *git_object_id(found.value().get()));
+    if (!isSame)
+    {
+        raiseGitError(GIT_EAMBIGUOUS, GIT_ERROR_REFERENCE,
+                      "'" + name +
+                          "' is also another reference, which comes before the branch: switch with "
+                          "'git switch', or rename one of them");
+    }
+}
+
 } // namespace
 
 BasicBranchManager::BasicBranchManager(GitAdapter &adapter)
@@ -146,12 +166,14 @@ void BasicBranchManager::switchBranch(const BranchName &name)
     IndexLock lock(repository.get());
     const OwnedHandle<git_reference> branch = lookupLocalBranch(repository.get(), shortName);
     const OwnedHandle<git_object> target = revparseObject(repository.get(), name).value();
+    refuseOtherReference(branch.get(), target.get(), name);
     refuseCheckedOutElsewhere(branch.get());
     refuseSwitchInUnfinishedOperation(repository.get());
     const CheckoutOptions options = optionsFactory_->makeCheckoutOptions();
     git_checkout_options record = toGitCheckoutOptions(options, callbacks_->checkoutCallbacks());
     CheckoutWatch watch(CheckoutKind::Switch, repository.get(), record);
     watch.lookBeforeSwitch(target.get());
+    refuseUnwritableReflog(repository.get(), "HEAD");
     awaitUnlocked(repository.get(), "HEAD");
     check(git_checkout_tree, repository.get(), target.get(), &record);
     watch.settleSubmodules();
@@ -200,6 +222,7 @@ void BasicBranchManager::deleteBranch(const BranchName &name)
         refuseDeletionInUnfinishedOperation(repository.get(), reference);
         // libgit2 removes the branch's configuration first, and does not restore it.
         awaitUnlocked(repository.get(), reference);
+        refuseUnremovableReflog(repository.get(), reference);
         const KeptMode mode(git_repository_commondir(repository.get()) + std::string("config"));
         return call(git_branch_delete, branch.get());
     };

@@ -2,19 +2,18 @@
 #include "main/checkout/CheckoutWatch.hpp"
 
 #include <array>
-#include <cstddef>
-#include <utility>
+#include <vector>
 
 #include <fcntl.h>
 #include <git2.h>
 
 #include "error/errorUtil/GitResult.hpp"
-#include "error/errorUtil/callbackException.hpp"
-#include "error/errorUtil/libgit2Errors.hpp"
 #include "main/checkout/RenamesToFolders.hpp"
+#include "main/checkout/askRules.hpp"
 #include "main/checkout/conflictLocks.hpp"
 #include "main/checkout/gitlinks.hpp"
 #include "main/checkout/obstaclesAhead.hpp"
+#include "main/checkout/severalBases.hpp"
 #include "main/mergeState/MergeBases.hpp"
 #include "util/repository/repository.hpp"
 
@@ -24,7 +23,6 @@ namespace
 {
 
 using ChangeRule = Finding (*)(WorkingCopy &, const TreeChange &);
-using NoticeRule = Finding (*)(WorkingCopy &, const CheckoutNotice &);
 
 // A file that stays a file needs only the first array of each pair.
 constexpr std::array<ChangeRule, 2> switchRules{findBlockedWay, findSpecialFile};
@@ -40,29 +38,12 @@ constexpr std::array<ChangeRule, 10> otherSwitchRules{findIgnoredLink,
                                                       findUnwritableFolder};
 constexpr std::array<ChangeRule, 3> stagedRules{findStagedSubmodule, findStagedDeletion,
                                                 findStagedContent};
-constexpr std::array<ChangeRule, 3> mergeRules{findBlockedWayOfMerge, findUntracked,
-                                               findSubmoduleAfterSibling};
+constexpr std::array<ChangeRule, 4> mergeRules{findBlockedWayOfMerge, findUntracked,
+                                               findSubmoduleAfterSibling,
+                                               findUnwritableFolderOfConflict};
 constexpr std::array<ChangeRule, 5> otherMergeRules{findFileForSubmodule, findSubmodule,
                                                     findFolderForDeletedFile, findUntrackedOfHead,
                                                     findUnwritableFolder};
-constexpr std::array<NoticeRule, 2> switchNoticeRules{findUnseen, findMissingFile};
-constexpr std::array<NoticeRule, 7> mergeNoticeRules{
-    findEdit,          findUnseen,           findUntrackedNoticed, findForeignInFolderNoticed,
-    findFolderNoticed, findSubmoduleNoticed, findHiddenEditNoticed};
-
-template <class Rules, class Subject>
-Finding ask(const Rules &rules, WorkingCopy &copy, const Subject &subject)
-{
-    for (const auto rule : rules)
-    {
-        Finding finding = rule(copy, subject);
-        if (finding)
-        {
-            return finding;
-        }
-    }
-    return {};
-}
 
 OwnedHandle<git_tree> treeOf(git_repository *repository, const git_oid *commitId)
 {
@@ -76,12 +57,6 @@ Finding firstOf(Finding left, Finding right)
     return !left || (right && right->path < left->path) ? right : left;
 }
 
-int setConflict(const Obstacle &obstacle)
-{
-    git_error_set_str(GIT_ERROR_CHECKOUT, obstacle.text.c_str());
-    return GIT_ECONFLICT;
-}
-
 } // namespace
 
 CheckoutWatch::CheckoutWatch(CheckoutKind kind, git_repository *repository,
@@ -89,7 +64,7 @@ CheckoutWatch::CheckoutWatch(CheckoutKind kind, git_repository *repository,
     : kind_(kind), repository_(repository), record_(record),
       isForced_((record.checkout_strategy & GIT_CHECKOUT_FORCE) != 0), first_(record.notify_cb),
       firstPayload_(record.notify_payload), progress_(record.progress_cb),
-      progressPayload_(record.progress_payload)
+      progressPayload_(record.progress_payload), promised_(repository)
 {
     const char *const workdir = git_repository_workdir(repository);
     root_ = workdir != nullptr ? workdir : "";
@@ -160,34 +135,23 @@ void CheckoutWatch::lookBeforeMerge(const git_oid *theirs)
     WorkingCopy &copy = lookAtWorkingCopy();
     const git_oid ours = readHeadId(repository_);
     const OwnedHandle<git_tree> after = treeOf(repository_, theirs);
-    const MergeBases bases(repository_, &ours, theirs);
+    const std::vector<OwnedHandle<git_tree>> bases =
+        readTrees(repository_, MergeBases(repository_, &ours, theirs));
     Finding first = findHiddenEdit(copy);
     Finding yielding;
     bool mayBeRenamed = false;
-    // Unrelated histories have the empty tree in common.
-    for (std::size_t i = 0; i == 0 || i < bases.size(); ++i)
+    for (const OwnedHandle<git_tree> &before : bases)
     {
-        const OwnedHandle<git_tree> before =
-            bases.size() != 0 ? treeOf(repository_, bases.at(i)) : nullptr;
         Finding found;
         RenamedLocks renamed;
         RenamesToFolders toFolders;
         visitTreeChanges(repository_, before.get(), after.get(),
                          [&](const TreeChange &change)
                          {
-                             const bool isOther = !staysFile(change);
-                             found = ask(mergeRules, copy, change);
-                             if (!found && isOther)
-                             {
-                                 found = ask(otherMergeRules, copy, change);
-                             }
-                             if (!found)
-                             {
-                                 found = findLockOfConflict(repository_, copy, change, after.get());
-                             }
+                             found = judgeMerge(copy, change, after.get());
                              renamed.note(copy, change);
                              toFolders.note(copy, change);
-                             if (isOther)
+                             if (!staysFile(change))
                              {
                                  merged_.noteChange(copy, change);
                                  yielding = firstOf(yielding, findYielding(copy, change));
@@ -205,6 +169,10 @@ void CheckoutWatch::lookBeforeMerge(const git_oid *theirs)
         }
         first = firstOf(first, found);
     }
+    if (bases.size() > 1)
+    {
+        first = firstOf(first, findBetweenSides(repository_, copy, bases, after.get()));
+    }
     if (mayBeRenamed)
     {
         first = firstOf(first, yielding);
@@ -215,6 +183,28 @@ void CheckoutWatch::lookBeforeMerge(const git_oid *theirs)
     }
     merged_.stage(copy.index());
     copy.forget();
+}
+
+Finding CheckoutWatch::judgeMerge(WorkingCopy &copy, const TreeChange &change,
+                                  const git_tree *theirs)
+{
+    Finding found = ask(mergeRules, copy, change);
+    if (!found && !staysFile(change))
+    {
+        found = ask(otherMergeRules, copy, change);
+    }
+    if (!found)
+    {
+        found = findOtherCase(copy, change, theirs);
+    }
+    if (!found)
+    {
+        found = findLockOfConflict(repository_, copy, change, theirs);
+    }
+    // There is no notification of a conflict.
+    const bool makesFile = change.after != nullptr && !isGitlink(change.after);
+    return !found && makesFile ? promised_.find(change.path, *git_tree_entry_id(change.after))
+                               : found;
 }
 
 void CheckoutWatch::settleSubmodules() const
@@ -233,182 +223,7 @@ void CheckoutWatch::refuse(const Obstacle &obstacle)
 {
     check(makeResult(first_(GIT_CHECKOUT_NOTIFY_CONFLICT, obstacle.path.c_str(), nullptr, nullptr,
                             nullptr, firstPayload_)));
-    check(makeResult(setConflict(obstacle)));
-}
-
-int CheckoutWatch::pass(git_checkout_notify_t why, const char *path, const git_diff_file *baseline,
-                        const git_diff_file *target, const git_diff_file *workdir,
-                        void *payload) noexcept
-{
-    auto &watch = *static_cast<CheckoutWatch *>(payload);
-    const int code = watch.first_(why, path, baseline, target, workdir, watch.firstPayload_);
-    if (code != 0)
-    {
-        return code;
-    }
-    try
-    {
-        return watch.hear({why, path, baseline, target, workdir});
-    }
-    catch (...)
-    {
-        return parkCallbackException();
-    }
-}
-
-/// Runs after the last notification, and before libgit2 writes.
-void CheckoutWatch::passProgress(const char *path, std::size_t completed, std::size_t total,
-                                 void *payload) noexcept
-{
-    auto &watch = *static_cast<CheckoutWatch *>(payload);
-    watch.remade_.remove();
-    if (watch.progress_ != nullptr)
-    {
-        watch.progress_(path, completed, total, watch.progressPayload_);
-    }
-}
-
-Finding CheckoutWatch::noteOverwritten(const CheckoutNotice &notice)
-{
-    const bool makesFile = notice.why == GIT_CHECKOUT_NOTIFY_UPDATED && notice.target != nullptr &&
-                           !isGitlink(notice.target);
-    if (!makesFile)
-    {
-        return {};
-    }
-    const bool isExecutable = notice.target->mode == GIT_FILEMODE_BLOB_EXECUTABLE;
-    const std::string reason = remade_.note(path_.assign(root_).append(notice.path), isExecutable);
-    return reason.empty()
-               ? Finding()
-               : Obstacle{notice.path, "the file '" + std::string(notice.path) + "' " + reason};
-}
-
-int CheckoutWatch::hear(const CheckoutNotice &notice)
-{
-    if (notice.path == nullptr)
-    {
-        return 0;
-    }
-    if (kind_ == CheckoutKind::Revert)
-    {
-        const Finding found = clearAll(notice);
-        return answer(found ? found : noteOverwritten(notice));
-    }
-    if (!copy_)
-    {
-        return 0;
-    }
-    // The commands of a merge may have run for minutes since the first look.
-    if (!std::exchange(hasHeard_, true))
-    {
-        copy_->forget();
-        if (copy_->hasHeadMoved())
-        {
-            git_error_set_str(GIT_ERROR_REFERENCE, Head::movedText);
-            return GIT_EMODIFIED;
-        }
-    }
-    const Finding found = judge(notice);
-    return answer(found ? found : noteOverwritten(notice));
-}
-
-int CheckoutWatch::answer(const Finding &found)
-{
-    hasRefused_ = found.has_value();
-    return hasRefused_ ? setConflict(*found) : 0;
-}
-
-Finding CheckoutWatch::judge(const CheckoutNotice &notice)
-{
-    Finding found = kind_ == CheckoutKind::Merge ? ask(mergeNoticeRules, *copy_, notice)
-                                                 : ask(switchNoticeRules, *copy_, notice);
-    if (!found)
-    {
-        makeWay(notice);
-        noteUntracked(notice);
-    }
-    return found;
-}
-
-void CheckoutWatch::noteUntracked(const CheckoutNotice &notice)
-{
-    if (kind_ != CheckoutKind::Merge || notice.why != GIT_CHECKOUT_NOTIFY_UNTRACKED)
-    {
-        return;
-    }
-    std::string name = notice.path;
-    if (!name.empty() && name.back() == '/')
-    {
-        name.pop_back();
-        merged_.noteUntracked(*copy_, name);
-    }
-}
-
-/// Removes what no rule protects and libgit2 would write through or fail at: an ignored link in the
-/// place of a new file, and an empty folder in the place of any file that libgit2 has passed.
-void CheckoutWatch::makeWay(const CheckoutNotice &notice)
-{
-    const bool isNew = notice.baseline == nullptr;
-    const bool isPast = notice.workdir == nullptr;
-    if (notice.why != GIT_CHECKOUT_NOTIFY_UPDATED || notice.target == nullptr ||
-        isGitlink(notice.target) || !(isNew || isPast))
-    {
-        return;
-    }
-    const std::string name = notice.path;
-    const WorkingCopy::Way &way = copy_->wayTo(name);
-    if (isNew && way.standing == Standing::Link)
-    {
-        cleared_.remove(root_ + way.blocker);
-        copy_->forget();
-    }
-    const Standing standing = copy_->at(name);
-    if ((isNew && standing == Standing::Link) || (isPast && standing == Standing::Folder))
-    {
-        cleared_.remove(root_ + name);
-    }
-}
-
-/// libgit2 itself replaces what it sees in the way of a revert. What it has already passed would
-/// stop it in the middle of its writing.
-Finding CheckoutWatch::clearAll(const CheckoutNotice &notice)
-{
-    if (notice.target == nullptr)
-    {
-        return {};
-    }
-    const bool isPast = notice.why == GIT_CHECKOUT_NOTIFY_UPDATED && notice.workdir == nullptr;
-    if (notice.workdir != nullptr)
-    {
-        replaced_ = notice.workdir->path;
-    }
-    const std::string name = notice.path;
-    for (auto end = name.find('/'); end != std::string::npos; end = name.find('/', end + 1))
-    {
-        const std::string above = name.substr(0, end);
-        const Standing standing = standingAt(root_ + above);
-        if (standing == Standing::Link || standing == Standing::Special)
-        {
-            cleared_.remove(root_ + above);
-        }
-        else if (standing == Standing::File && isPast && above != replaced_)
-        {
-            return inTheWay(above, standing);
-        }
-    }
-    const Standing standing = standingAt(root_ + name);
-    const bool isSubmodule = isGitlink(notice.target);
-    if (isSubmodule && standing == Standing::File)
-    {
-        return inTheWay(name, standing);
-    }
-    const bool isFolder = standing == Standing::Folder && isPast && !isSubmodule;
-    if (isFolder || standing == Standing::Link || standing == Standing::Special)
-    {
-        cleared_.remove(root_ + name);
-    }
-    return isFolder && standingAt(root_ + name) == Standing::Folder ? inTheWay(name, standing)
-                                                                    : Finding();
+    check(makeResult(reportConflict(obstacle)));
 }
 
 } // namespace vclink::git

@@ -12,6 +12,7 @@
 #include "main/checkout/ClearedWay.hpp"
 #include "main/checkout/MergeSubmodules.hpp"
 #include "main/checkout/Obstacle.hpp"
+#include "main/checkout/PromisedContent.hpp"
 #include "main/checkout/RemadeFiles.hpp"
 #include "main/checkout/SwitchSubmodules.hpp"
 #include "main/checkout/WorkingCopy.hpp"
@@ -88,6 +89,7 @@ class CheckoutWatch
     Finding noteOverwritten(const CheckoutNotice &notice);
     Finding judge(const CheckoutNotice &notice);
     Finding judgeSwitch(WorkingCopy &copy, const TreeChange &change);
+    Finding judgeMerge(WorkingCopy &copy, const TreeChange &change, const git_tree *theirs);
     void makeWay(const CheckoutNotice &notice);
     WorkingCopy &lookAtWorkingCopy();
     void noteUntracked(const CheckoutNotice &notice);
@@ -102,6 +104,7 @@ class CheckoutWatch
     void *firstPayload_;
     git_checkout_progress_cb progress_;
     void *progressPayload_;
+    PromisedContent promised_;
     std::string root_;
     /// Empty until the first look. A revert needs none.
     std::optional<WorkingCopy> copy_;

@@ -1,6 +1,10 @@
 // SPDX-License-Identifier: MIT
 #include "main/checkout/Obstacle.hpp"
 
+#include <git2/errors.h>
+
+#include "error/errorUtil/libgit2Errors.hpp"
+
 namespace vclink::git
 {
 namespace
@@ -36,6 +40,12 @@ Obstacle inChangedFolder(const std::string &name, Standing standing)
     // It can be staged, so it is not necessarily untracked.
     const char *const what = standing == Standing::File ? "the file " : describe(standing);
     return {name, what + ("'" + name) + "' is in a folder that becomes a file"};
+}
+
+int reportConflict(const Obstacle &obstacle)
+{
+    git_error_set_str(GIT_ERROR_CHECKOUT, obstacle.text.c_str());
+    return GIT_ECONFLICT;
 }
 
 } // namespace vclink::git

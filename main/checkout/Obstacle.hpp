@@ -26,4 +26,7 @@ Obstacle inTheWay(const std::string &name, Standing standing);
 /// The same in a folder that becomes a file.
 Obstacle inChangedFolder(const std::string &name, Standing standing);
 
+/// Makes the text libgit2's last error, and returns GIT_ECONFLICT, for a callback.
+int reportConflict(const Obstacle &obstacle);
+
 } // namespace vclink::git

@@ -53,6 +53,13 @@ bool isRemovable(const std::string &path, const struct stat &status)
 
 } // namespace
 
+bool mustBeRemade(const std::string &path)
+{
+    struct stat status = {};
+    return ::lstat(path.c_str(), &status) == 0 && S_ISREG(status.st_mode) &&
+           (status.st_nlink != 1 || writeError(path, status) != 0);
+}
+
 std::string RemadeFiles::note(const std::string &path, bool isExecutable)
 {
     struct stat status = {};

@@ -7,6 +7,10 @@
 namespace vclink::git
 {
 
+/// Returns true for a file with further names, or that cannot be opened for writing.
+/// @param path absolute
+bool mustBeRemade(const std::string &path);
+
 /// The files that a checkout overwrites, and makes anew as git does. libgit2 writes into the
 /// existing file. If it has other names, it changes under all of them, even in other folders. If it
 /// cannot be opened for writing, because it is read-only, another user's or a running program,

@@ -13,6 +13,7 @@
 #include <unistd.h>
 
 #include "error/errorUtil/GitResult.hpp"
+#include "main/checkout/RemadeFiles.hpp"
 #include "main/checkout/gitlinks.hpp"
 #include "util/repository/objectIds.hpp"
 #include "util/repository/repository.hpp"
@@ -281,6 +282,11 @@ bool WorkingCopy::hasEntryBelow(const std::string &folder) const
     }
     found.value();
     return true;
+}
+
+bool WorkingCopy::mustBeRemade(const std::string &name)
+{
+    return vclink::git::mustBeRemade(pathOf(name));
 }
 
 bool WorkingCopy::isInHead(const std::string &name) const

@@ -88,6 +88,10 @@ class WorkingCopy
     /// @throws LibGit2Exception if it cannot be read
     void readModulesFor(const TreeChange &change) const;
 
+    /// Returns true if this is a file that a checkout cannot simply write to; see
+    /// vclink::git::mustBeRemade.
+    bool mustBeRemade(const std::string &name);
+
     bool isInHead(const std::string &name) const;
     /// Returns true if HEAD has a folder of this name.
     bool isFolderInHead(const std::string &name) const;

@@ -4,6 +4,7 @@
 #include <algorithm>
 #include <memory>
 #include <string>
+#include <utility>
 
 #include <git2/attr.h>
 #include <git2/errors.h>
@@ -13,6 +14,7 @@
 
 #include "error/errorUtil/GitResult.hpp"
 #include "main/checkout/gitlinks.hpp"
+#include "main/checkout/obstaclesAhead.hpp"
 
 namespace vclink::git
 {
@@ -111,6 +113,14 @@ Finding findLockOfConflict(git_repository *repository, WorkingCopy &copy, const 
     return besideLock(change.path);
 }
 
+Finding findLockBesideFile(WorkingCopy &copy, const TreeChange &change, const git_tree *theirs)
+{
+    const bool areFiles = change.before != nullptr && change.after != nullptr &&
+                          !isGitlink(change.before) && !isGitlink(change.after);
+    return areFiles && isThere(copy, change.path + ".lock", theirs) ? besideLock(change.path)
+                                                                    : Finding();
+}
+
 void RenamedLocks::note(WorkingCopy &copy, const TreeChange &change)
 {
     if (change.before == nullptr || isGitlink(change.before) || isGitlink(change.after))
@@ -167,16 +177,21 @@ Finding RenamedLocks::findIn(git_repository *repository, WorkingCopy &copy, cons
                                return isConflict(repository, &base, renamed, changed);
                            });
     };
+    const auto obstacleOf = [&](const std::string &path)
+    {
+        return isThere(copy, path + ".lock", theirs) ? besideLock(path)
+                                                     : findUnwritableFolderOf(copy, path);
+    };
     visitTreeChanges(repository, before, renaming,
                      [&](const TreeChange &change)
                      {
                          const bool isAdded = change.before == nullptr && change.after != nullptr &&
                                               !isGitlink(change.after);
-                         const std::string lock = change.path + ".lock";
-                         if (isAdded && isThere(copy, lock, theirs) &&
+                         Finding obstacle = isAdded ? obstacleOf(change.path) : Finding();
+                         if (obstacle &&
                              (hasCommand(repository, change.path) || isInConflict(change)))
                          {
-                             found = besideLock(change.path);
+                             found = std::move(obstacle);
                          }
                          return !found;
                      });

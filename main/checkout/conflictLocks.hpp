@@ -23,7 +23,13 @@ namespace vclink::git
 Finding findLockOfConflict(git_repository *repository, WorkingCopy &copy, const TreeChange &change,
                            const git_tree *theirs);
 
-/// The same rule for a file that one side has renamed and the other has changed.
+/// Finds such a name beside any file that both sides have, and have differently.
+/// @param change from our side to theirs
+/// @throws LibGit2Exception
+Finding findLockBesideFile(WorkingCopy &copy, const TreeChange &change, const git_tree *theirs);
+
+/// The same rule for a file that one side has renamed and the other has changed. There it also
+/// finds folders that cannot be written to, because libgit2 removes the file and makes it anew.
 class RenamedLocks
 {
   public:

@@ -188,10 +188,7 @@ Finding findUnwritableFolder(WorkingCopy &copy, const TreeChange &change)
     {
         return {};
     }
-    const std::string &folder = copy.unwritableFolderOf(change.path);
-    return folder.empty()
-               ? Finding()
-               : Obstacle{change.path, "the folder '" + folder + "' cannot be written to"};
+    return findUnwritableFolderOf(copy, change.path);
 }
 
 Finding findFolderForDeletedFile(WorkingCopy &copy, const TreeChange &change)
@@ -239,14 +236,42 @@ Finding findUntracked(WorkingCopy &copy, const TreeChange &change)
     const Standing standing = copy.at(change.path);
     const bool isOpened = standing == Standing::Special ||
                           (standing != Standing::File && isWrittenUnnoticed(copy, change));
+    // libgit2 writes to it as it is, and with it to its other names.
+    const bool isHeld = standing == Standing::File && isWrittenUnnoticed(copy, change) &&
+                        copy.mustBeRemade(change.path);
     const bool isKeptFolder =
         standing == Standing::Folder &&
         (copy.isFolderInHead(change.path) || (!isOpened && !copy.holdsFiles(change.path)));
-    if (standing == Standing::Nothing || isKeptFolder || (!isOpened && copy.isIgnored(change.path)))
+    if (standing == Standing::Nothing || isKeptFolder ||
+        (!isOpened && !isHeld && copy.isIgnored(change.path)))
     {
         return {};
     }
     return inTheWay(change.path, standing);
+}
+
+Finding findUnwritableFolderOfConflict(WorkingCopy &copy, const TreeChange &change)
+{
+    const git_index_entry *const ours = copy.entryOf(change.path);
+    const bool isMerged = ours != nullptr && makesFile(change) && !isOf(*ours, change.before) &&
+                          !isOf(*ours, change.after);
+    return isMerged ? findUnwritableFolderOf(copy, change.path) : Finding();
+}
+
+Finding findOtherCase(WorkingCopy &copy, const TreeChange &change, const git_tree *theirs)
+{
+    if (change.before != nullptr || !makesFile(change))
+    {
+        return {};
+    }
+    const git_index_entry *const ours = copy.entryOf(change.path);
+    if (ours == nullptr || change.path == ours->path || findInTree(theirs, ours->path) == nullptr)
+    {
+        return {};
+    }
+    return Obstacle{change.path, "the names '" + change.path + "' and '" + ours->path +
+                                     "' differ only in case, and 'core.ignorecase' is set: merge "
+                                     "with 'git merge'"};
 }
 
 Finding findUntrackedOfHead(WorkingCopy &copy, const TreeChange &change)
@@ -265,8 +290,10 @@ Finding findYielding(WorkingCopy &copy, const TreeChange &change)
         return {};
     }
     const Finding above = findBlockedWay(copy, change);
-    const bool isLink = !above && copy.at(change.path) == Standing::Link;
-    return isLink ? inTheWay(change.path, Standing::Link) : above;
+    const Standing standing = above ? Standing::Nothing : copy.at(change.path);
+    const bool isRemoved = standing == Standing::Link ||
+                           (standing == Standing::File && copy.mustBeRemade(change.path));
+    return isRemoved ? inTheWay(change.path, standing) : above;
 }
 
 bool isDeletedByBoth(WorkingCopy &copy, const TreeChange &change)
@@ -301,6 +328,13 @@ Obstacle hiddenEdit(const git_index_entry &entry)
     return {name, "the changes of '" + name + "' would be lost in the merge. Git hides them, " +
                       "because the file is marked " + option + ": take the mark away with " +
                       "'git update-index --no-" + option + "' and commit, or remove the file"};
+}
+
+Finding findUnwritableFolderOf(WorkingCopy &copy, const std::string &name)
+{
+    const std::string &folder = copy.unwritableFolderOf(name);
+    return folder.empty() ? Finding()
+                          : Obstacle{name, "the folder '" + folder + "' cannot be written to"};
 }
 
 } // namespace vclink::git

@@ -62,8 +62,8 @@ Finding findUnwritableFolder(WorkingCopy &copy, const TreeChange &change);
 /// As findBlockedWay, but ignored links and files do not count.
 Finding findBlockedWayOfMerge(WorkingCopy &copy, const TreeChange &change);
 /// Finds something untracked in the place of a file of the other side, unless it is ignored or an
-/// empty folder. A folder is always in the way if we have deleted the file and the other side has
-/// changed it.
+/// empty folder. If we have deleted the file and the other side has changed it, a folder is always
+/// in the way, and so is an ignored file with further names or that cannot be written to.
 Finding findUntracked(WorkingCopy &copy, const TreeChange &change);
 /// Finds the folder of a submodule that the other side has removed or replaced, that both have
 /// moved, or that only we have in a place that the other side changed as well, if the working tree
@@ -73,9 +73,16 @@ Finding findSubmoduleAfterSibling(WorkingCopy &copy, const TreeChange &change);
 /// Finds a file that the user no longer tracks and the other side has deleted or renamed. libgit2
 /// would delete it, because HEAD still has it.
 Finding findUntrackedOfHead(WorkingCopy &copy, const TreeChange &change);
+/// Finds a folder that cannot be written to around a file that both sides have changed. libgit2
+/// removes a file in conflict, and makes it anew.
+Finding findUnwritableFolderOfConflict(WorkingCopy &copy, const TreeChange &change);
+/// Finds a new file of the other side whose name differs from one of ours only in case, if the
+/// other side has ours too, and `core.ignorecase` is set. libgit2 keeps only one of them.
+/// @param theirs the other side's tree
+Finding findOtherCase(WorkingCopy &copy, const TreeChange &change, const git_tree *theirs);
 /// Finds what is removed for a new file if libgit2 reports it before it writes: an ignored link in
-/// its place, an ignored link or file above. For changes to which the other rules of a merge do not
-/// object.
+/// its place, an ignored file that must be made anew, an ignored link or file above. For changes to
+/// which the other rules of a merge do not object.
 Finding findYielding(WorkingCopy &copy, const TreeChange &change);
 /// Returns true if neither side has the file any more. If they have renamed it, it is in conflict,
 /// and libgit2 writes the file of the new name without reporting it.
@@ -86,4 +93,8 @@ Finding findHiddenEdit(WorkingCopy &copy);
 
 /// Returns the obstacle of findHiddenEdit for an entry with a change.
 Obstacle hiddenEdit(const git_index_entry &entry);
+
+/// Finds a folder above the name in which files cannot be created and removed.
+Finding findUnwritableFolderOf(WorkingCopy &copy, const std::string &name);
+
 } // namespace vclink::git

@@ -17,6 +17,7 @@
 #include "main/files/GitAdapter.hpp"
 #include "main/files/commitIdentity.hpp"
 #include "main/files/indexRefresh.hpp"
+#include "main/files/otherCase.hpp"
 #include "main/files/stageChangedFiles.hpp"
 #include "main/mergeState/MergeMarker.hpp"
 #include "main/mergeState/interruptedMerge.hpp"
@@ -102,7 +103,7 @@ void GitAdapter::commit(const upath & /*folder*/, const ustring &message)
     {
         refuseOtherParents(*expectedMerge_, parents);
     }
-    if (headCommit != nullptr && mergeHeads.size() == 1)
+    else if (headCommit != nullptr && mergeHeads.size() == 1)
     {
         refuseInterruptedMerge(repository.get(), parents.front(), parents.back());
     }
@@ -124,6 +125,7 @@ void GitAdapter::refreshForCommit(git_repository *repository, git_index *index,
                                   const std::vector<const git_commit *> &parents) const
 {
     const ChangedFiles changed(repository, index);
+    refuseOtherCase(index, changed);
     HeldEntries held;
     // Before anything else is changed in memory: after a failure the index is read again.
     const std::vector<std::string> removed =

@@ -25,6 +25,7 @@
 #include "util/lock/IndexLock.hpp"
 #include "util/lock/referenceLocks.hpp"
 #include "util/repository/Head.hpp"
+#include "util/repository/reflogAccess.hpp"
 #include "util/repository/repository.hpp"
 #include "vclink/git/messageIdentifiers.hpp"
 
@@ -122,6 +123,14 @@ void BranchMerger::decide(const BranchName &name, git_repository *repository)
     threeWayMerge(name, repository, theirs.get());
 }
 
+void BranchMerger::awaitWritableBranch(git_repository *repository, const git_reference *head)
+{
+    const char *const name = git_reference_name(head);
+    refuseUnwritableReflog(repository, "HEAD");
+    refuseUnwritableReflog(repository, name);
+    awaitUnlocked(repository, name);
+}
+
 void BranchMerger::refuseOtherStates(git_repository *repository)
 {
     if (readRepositoryState(repository) != GIT_REPOSITORY_STATE_NONE)
@@ -146,7 +155,7 @@ void BranchMerger::fastForward(git_repository *repository, git_annotated_commit 
     git_checkout_options record = toGitCheckoutOptions(options, callbacks_->checkoutCallbacks());
     CheckoutWatch watch(CheckoutKind::Switch, repository, record);
     watch.lookBeforeSwitch(target.get());
-    awaitUnlocked(repository, git_reference_name(head.get()));
+    awaitWritableBranch(repository, head.get());
     // The branch as it was read: libgit2 detects a later change when it moves the branch.
     headThen.refuseMoved(repository);
     check(git_checkout_tree, repository, target.get(), &record);

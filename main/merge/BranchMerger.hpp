@@ -48,6 +48,8 @@ class BranchMerger
     void decide(const BranchName &name, git_repository *repository);
     /// Call it again when the index is locked: until then another process may begin an operation.
     static void refuseOtherStates(git_repository *repository);
+    /// Waits for the branch's lock, and refuses reflogs that cannot be appended to.
+    static void awaitWritableBranch(git_repository *repository, const git_reference *head);
     void commitMerge(const BranchName &name, git_repository *repository, const MergeSides &sides);
     [[noreturn]] void endWithConflicts(git_repository *repository, git_index *index,
                                        const git_checkout_options &options, IndexLock &lock);

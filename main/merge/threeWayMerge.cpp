@@ -26,7 +26,6 @@
 #include "main/mergeState/mergeHead.hpp"
 #include "options/gitRecords.hpp"
 #include "util/lock/IndexLock.hpp"
-#include "util/lock/referenceLocks.hpp"
 #include "util/path/PathspecArray.hpp"
 #include "util/path/pathspecEscape.hpp"
 #include "util/repository/repository.hpp"
@@ -116,14 +115,6 @@ std::vector<ustring> makeExactPatterns(const std::vector<ustring> &paths)
     return patterns;
 }
 
-/// Otherwise the merge would be complete before its commit fails.
-void awaitUnlockedBranch(git_repository *repository)
-{
-    const OwnedHandle<git_reference> head =
-        acquire<git_reference>(git_repository_head, repository).value();
-    awaitUnlocked(repository, git_reference_name(head.get()));
-}
-
 } // namespace
 
 void collectUnmergeable(git_repository *repository, std::vector<ustring> &paths,
@@ -153,7 +144,9 @@ void BranchMerger::threeWayMerge(const BranchName &name, git_repository *reposit
     refuseOtherStates(repository);
     CheckoutWatch watch(CheckoutKind::Merge, repository, checkoutRecord);
     watch.lookBeforeMerge(git_annotated_commit_id(theirs));
-    awaitUnlockedBranch(repository);
+    // Otherwise the merge would be complete before its commit fails.
+    awaitWritableBranch(repository,
+                        acquire<git_reference>(git_repository_head, repository).value().get());
     const MergeSides sides{readHeadId(repository), *git_annotated_commit_id(theirs)};
     marker.emplace(repository, sides);
     check(git_merge, repository, heads, 1U, &mergeRecord, &checkoutRecord);

@@ -2,6 +2,7 @@
 #pragma once
 
 #include <cstddef>
+#include <vector>
 
 #include <git2/errors.h>
 #include <git2/merge.h>
@@ -50,5 +51,10 @@ class MergeBases
 
     git_oidarray array_{};
 };
+
+/// Returns the trees of the merge bases; for unrelated histories one that is null, the empty tree.
+/// git_commit_lookup, git_commit_tree.
+/// @throws LibGit2Exception
+std::vector<OwnedHandle<git_tree>> readTrees(git_repository *repository, const MergeBases &bases);
 
 } // namespace vclink::git

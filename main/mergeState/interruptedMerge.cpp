@@ -80,25 +80,6 @@ OwnedHandle<git_tree> treeOf(const git_commit *commit)
     return acquire<git_tree>(git_commit_tree, commit).value();
 }
 
-/// Returns the trees with which both sides began, one that is null if they have nothing in common.
-std::vector<OwnedHandle<git_tree>> findBases(git_repository *repository, const git_commit *ours,
-                                             const git_commit *theirs)
-{
-    const MergeBases bases(repository, git_commit_id(ours), git_commit_id(theirs));
-    std::vector<OwnedHandle<git_tree>> trees;
-    trees.reserve(bases.size() + 1);
-    for (std::size_t i = 0; i < bases.size(); ++i)
-    {
-        trees.push_back(
-            treeOf(acquire<git_commit>(git_commit_lookup, repository, bases.at(i)).value().get()));
-    }
-    if (trees.empty())
-    {
-        trees.push_back(nullptr);
-    }
-    return trees;
-}
-
 /// A file of a tree or an index. The mode is 0 if it does not exist.
 struct File
 {
@@ -177,13 +158,16 @@ int lookAt(const git_diff * /*diff*/, const git_diff_delta *delta, const char * 
 /// Returns true if only theirs has changed some files, and the index has none of these changes.
 bool isNothingTaken(git_repository *repository, const git_commit *ours, const git_commit *theirs)
 {
-    const std::vector<OwnedHandle<git_tree>> bases = findBases(repository, ours, theirs);
+    const std::vector<OwnedHandle<git_tree>> bases =
+        readTrees(repository, MergeBases(repository, git_commit_id(ours), git_commit_id(theirs)));
     const OwnedHandle<git_tree> oursTree = treeOf(ours);
     const OwnedHandle<git_tree> theirsTree = treeOf(theirs);
     const OwnedHandle<git_index> index = getRepositoryIndex(repository);
     Search search{bases, oursTree.get(), index.get()};
     git_diff_options options{};
     check(git_diff_options_init, &options, unsigned{GIT_DIFF_OPTIONS_VERSION});
+    // Otherwise a file that becomes a link is a new one, which a file that ours has renamed is not.
+    options.flags = GIT_DIFF_INCLUDE_TYPECHANGE;
     options.notify_cb = lookAt;
     options.payload = &search;
     git_diff *raw = nullptr;

@@ -131,13 +131,25 @@ TEST_F(SwitchBranch, TakesLocalBranchesOnly)
     }
 }
 
-/// The tree is the one that the name means as a revision, and there a tag comes first.
-TEST_F(SwitchBranch, TakesTheTreeOfATagThatHidesTheBranch)
+/// libgit2 would write the files of the other reference.
+TEST_F(SwitchBranch, IsRefusedIfTheNameMeansAnotherCommitFirst)
 {
-    repository_.git({"tag", "topic", "main"});
+    for (const std::string reference : {"refs/topic", "refs/tags/topic"})
+    {
+        repository_.git({"update-ref", reference, "main"});
+        expectRefused("topic", {GIT_EAMBIGUOUS, GIT_ERROR_REFERENCE,
+                                "'topic' is also another reference, which comes before the branch: "
+                                "switch with 'git switch', or rename one of them"});
+        repository_.git({"update-ref", "-d", reference});
+    }
+}
+
+TEST_F(SwitchBranch, MayShareItsNameWithATagOfTheSameCommit)
+{
+    repository_.git({"tag", "--annotate", "--message=tag", "topic", "topic"});
     switchTo("topic");
     EXPECT_EQ(currentBranch(), "refs/heads/topic");
-    EXPECT_EQ(repository_.read("a"), "of main\n");
+    EXPECT_TRUE(status().empty());
 }
 
 /// libgit2 finds that out when the files are written.

@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: MIT
+#include <functional>
 #include <string>
 
 #include <gtest/gtest.h>
@@ -31,6 +32,35 @@ class MergeBases : public vclink::test::ObstacleFixture
         repository_.git({"checkout", "--quiet", "main"});
     }
 
+    /// Has two branches, "one" and "two", change a name and merge each other, so that each keeps
+    /// what the other had first. Then merges them.
+    void expectBetweenSides(const std::string &name,
+                            const std::function<void(const std::string &)> &change,
+                            const std::string &text)
+    {
+        repository_.write(name, "old\n");
+        repository_.write("x.lock", "tracked\n");
+        repository_.commitAll("old");
+        repository_.git({"branch", "one"});
+        repository_.git({"branch", "two"});
+        const auto commitOn = [&](const std::string &branch, const std::string &content)
+        {
+            repository_.git({"switch", "--quiet", branch});
+            change(content);
+            repository_.commitAll(content);
+        };
+        commitOn("one", "first\n");
+        commitOn("two", "second\n");
+        repository_.git({"branch", "second", "two"});
+        repository_.git({"merge", "--quiet", "--strategy=ours", "--no-edit", "one"});
+        commitOn("two", "first\n");
+        repository_.git({"switch", "--quiet", "one"});
+        repository_.git({"merge", "--quiet", "--strategy=ours", "--no-edit", "second"});
+        commitOn("one", "second\n");
+        repository_.git({"branch", "--force", "topic", "two"});
+        expectMergeRefused(refusal(text));
+    }
+
   private:
     void writeBoth(const std::string &first, const std::string &second)
     {
@@ -52,6 +82,27 @@ TEST_F(MergeBases, AreAllLookedAt)
         repository_.remove(name);
     }
     expectConflicts("topic");
+}
+
+/// Neither base shows a conflict of "x", but both together have one.
+TEST_F(MergeBases, TogetherCanMakeAConflictBesideALock)
+{
+    expectBetweenSides(
+        "x", [this](const std::string &text) { repository_.write("x", text); },
+        "the conflict in 'x' cannot be written beside 'x.lock': merge with 'git merge'");
+}
+
+TEST_F(MergeBases, TogetherCanMakeAConflictOfAFileAndAFolder)
+{
+    expectBetweenSides(
+        "y",
+        [this](const std::string &text)
+        {
+            repository_.remove("y");
+            text == "first\n" ? repository_.symlink("file", "y") : repository_.write("y/z", text);
+        },
+        "'y' is a file of one side and a folder of the other, and there are several merge bases: "
+        "merge with 'git merge'");
 }
 
 } // namespace

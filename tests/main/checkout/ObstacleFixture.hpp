@@ -14,6 +14,7 @@
 #include <unistd.h>
 
 #include "main/merge/MergeFixture.hpp"
+#include "support/UnprivilegedUser.hpp"
 
 namespace vclink::test
 {
@@ -92,6 +93,22 @@ class ObstacleFixture : public MergeFixture
     void expectMergeRefused(const Failure &failure) const
     {
         expectNothingChanges([&] { EXPECT_EQ(failureOfMerge("topic"), textOf(failure)); });
+    }
+
+    /// Gives the working copy to the unprivileged user, runs `action` as that user while a name has
+    /// these permissions, expects that nothing changes, and returns what `action` returns.
+    std::string runUnprivileged(const std::string &name, mode_t mode,
+                                const std::function<std::string()> &action) const
+    {
+        repository_.git({"config", "--global", "safe.directory", "*"});
+        giveToUnprivilegedUser(folder().path());
+        const NothingChanges nothing(repository_);
+        struct stat before = {};
+        EXPECT_EQ(::stat((repository_ / name).c_str(), &before), 0);
+        repository_.setMode(name, mode);
+        std::string result = runAsUnprivilegedUser(action);
+        repository_.setMode(name, before.st_mode & ALLPERMS);
+        return result;
     }
 
   private:

@@ -8,6 +8,7 @@
 #include <vector>
 
 #include <fcntl.h>
+#include <gmock/gmock.h>
 #include <gtest/gtest.h>
 #include <sys/stat.h>
 #include <sys/wait.h>
@@ -21,6 +22,7 @@ namespace
 {
 
 namespace fs = std::filesystem;
+using testing::HasSubstr;
 using vclink::test::asPath;
 using vclink::test::failureOf;
 using vclink::test::giveToUnprivilegedUser;
@@ -65,6 +67,11 @@ class UnwritableFiles : public vclink::test::ObstacleFixture
                 }
                 return std::string();
             });
+    }
+    void expectMergeRefusedIn(const std::string &closed) const
+    {
+        EXPECT_EQ(runUnprivileged(closed, 0555, [this] { return failureOfMerge("topic"); }),
+                  textOf(refusal("the folder '" + closed + "/' cannot be written to")));
     }
     void expectAll(const std::string &content) const
     {
@@ -205,6 +212,71 @@ TEST_F(UnwritableFiles, ThatChangeTheirPermissionsInSuchAFolderAreRefused)
     EXPECT_EQ(text, "the file 'd/r' changes its permissions, and its folder cannot be written to");
     expectAll("old\n");
     EXPECT_FALSE(fs::exists(repository_ / "n"));
+}
+
+/// libgit2 removes each file in conflict, and makes it anew.
+TEST_F(UnwritableFiles, InConflictInSuchAFolderAreRefused)
+{
+    diverge(
+        [this]
+        {
+            for (const auto *name : {"a", "d/r"})
+                repository_.write(name, "ours\n");
+        },
+        changingAll());
+    expectMergeRefusedIn("d");
+}
+
+TEST_F(UnwritableFiles, InConflictInSuchAFolderAreRefusedIfTheyAreRenamed)
+{
+    const std::string lines = "1\n2\n3\n4\n5\n6\n7\n8\n";
+    repository_.write("b", lines + "old\n");
+    repository_.commitAll("lines");
+    diverge(
+        [this, &lines]
+        {
+            repository_.write("a", "ours\n");
+            repository_.remove("b");
+            repository_.write("e/renamed", lines + "ours\n");
+        },
+        [this, &lines]
+        {
+            repository_.write("a", "theirs\n");
+            repository_.write("b", lines + "theirs\n");
+        });
+    expectMergeRefusedIn("e");
+}
+
+/// Ignored files may be overwritten, but not what else they are.
+TEST_F(UnwritableFiles, OfOurOwnWhereTheirsIsInConflictAreRefused)
+{
+    repository_.write(".git/info/exclude", "i\n");
+    repository_.write("i", "old\n");
+    repository_.git({"add", "--force", "i"});
+    repository_.commitAll("ignored");
+    diverge([this] { repository_.remove("i"); }, writing("i", "theirs\n"));
+    repository_.write("../precious", "precious\n");
+    fs::create_hard_link(repository_ / "../precious", repository_ / "i");
+    expectMergeRefused(inTheWay("untracked file 'i'"));
+    repository_.remove("i");
+    repository_.write("i", "precious\n");
+    repository_.setMode("i", 0444);
+    const std::string text = unprivileged([this] { merge("topic"); });
+    EXPECT_THAT(text, HasSubstr("the untracked file 'i' is in the way of the checkout"));
+    EXPECT_EQ(repository_.read("i"), "precious\n");
+    repository_.setMode("i", 0644);
+    EXPECT_EQ(unprivileged([this] { expectConflicts("topic"); }), "");
+    EXPECT_EQ(repository_.read("i"), "theirs\n");
+}
+
+TEST_F(UnwritableFiles, OfOurOwnWhereTheirsIsRenamedToAreRefused)
+{
+    repository_.write(".git/info/exclude", "i\n");
+    repository_.write("../precious", "precious\n");
+    diverge([this] { repository_.remove("a"); }, moving("a", "i"));
+    fs::create_hard_link(repository_ / "../precious", repository_ / "i");
+    expectMergeRefused(inTheWay("untracked file 'i'"));
+    EXPECT_EQ(repository_.read("../precious"), "precious\n");
 }
 
 /// Only the owner may remove another user's file from a folder like /tmp.

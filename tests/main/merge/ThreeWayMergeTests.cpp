@@ -147,6 +147,19 @@ TEST_F(ThreeWayMerge, OfCrissCrossHistoriesCanTakeNothingOfTheirs)
     expectCleanAsGit();
 }
 
+TEST_F(ThreeWayMerge, OfAChangedTypeWhereOursIsRenamedIsCommitted)
+{
+    diverge(moving("file", "renamed"),
+            [this]
+            {
+                repository_.remove("file");
+                repository_.symlink("other", "file");
+            });
+    EXPECT_NO_THROW(merge("topic"));
+    EXPECT_EQ(parents().size(), 2U);
+    EXPECT_TRUE(status().empty());
+}
+
 TEST_F(ThreeWayMerge, WithAnOctopusAmongTheAncestorsIsAsInGitAndOfItsBranchesDoesNothing)
 {
     for (const std::string name : {"one", "two", "three"})

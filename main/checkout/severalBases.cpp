@@ -1,0 +1,70 @@
+// SPDX-License-Identifier: MIT
+#include "main/checkout/severalBases.hpp"
+
+#include <algorithm>
+#include <string>
+
+#include <git2/tree.h>
+
+#include "main/checkout/conflictLocks.hpp"
+#include "main/checkout/gitlinks.hpp"
+#include "main/checkout/treeChanges.hpp"
+
+namespace vclink::git
+{
+namespace
+{
+
+bool isFolder(const git_tree *tree, const std::string &path)
+{
+    const OwnedTreeEntry entry = findInTree(tree, path);
+    return entry != nullptr && git_tree_entry_type(entry.get()) == GIT_OBJECT_TREE;
+}
+
+bool isIn(const git_tree *base, const std::string &path, const git_tree_entry *file)
+{
+    const OwnedTreeEntry entry = findInTree(base, path);
+    return entry != nullptr &&
+           isSameId(*git_tree_entry_id(entry.get()), *git_tree_entry_id(file)) &&
+           git_tree_entry_filemode(entry.get()) == git_tree_entry_filemode(file);
+}
+
+/// @param change from our side to theirs
+Finding findFileAndFolder(const WorkingCopy &copy, const TreeChange &change,
+                          const std::vector<OwnedHandle<git_tree>> &bases, const git_tree *theirs)
+{
+    const git_tree_entry *const file = change.before != nullptr ? change.before : change.after;
+    const git_tree *const other = change.before != nullptr ? theirs : copy.head();
+    const bool isOneSided = change.before == nullptr || change.after == nullptr;
+    if (!isOneSided || isGitlink(file) || !isFolder(other, change.path) ||
+        std::all_of(bases.begin(), bases.end(),
+                    [&](const OwnedHandle<git_tree> &base)
+                    { return isIn(base.get(), change.path, file); }))
+    {
+        return {};
+    }
+    return Obstacle{change.path, "'" + change.path +
+                                     "' is a file of one side and a folder of the other, and there "
+                                     "are several merge bases: merge with 'git merge'"};
+}
+
+} // namespace
+
+Finding findBetweenSides(git_repository *repository, WorkingCopy &copy,
+                         const std::vector<OwnedHandle<git_tree>> &bases, const git_tree *theirs)
+{
+    Finding found;
+    visitTreeChanges(repository, copy.head(), theirs,
+                     [&](const TreeChange &change)
+                     {
+                         found = findLockBesideFile(copy, change, theirs);
+                         if (!found)
+                         {
+                             found = findFileAndFolder(copy, change, bases, theirs);
+                         }
+                         return !found;
+                     });
+    return found;
+}
+
+} // namespace vclink::git

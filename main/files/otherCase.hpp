@@ -1,0 +1,16 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <git2/types.h>
+
+#include "main/files/ChangedFiles.hpp"
+
+namespace vclink::git
+{
+
+/// Refuses a changed file if the index has another file whose name differs only in case, and
+/// `core.ignorecase` is set: libgit2 would store its content under the other name.
+/// @throws LibGit2Exception that names both
+void refuseOtherCase(git_index *index, const ChangedFiles &changed);
+
+} // namespace vclink::git

@@ -1,0 +1,65 @@
+// SPDX-License-Identifier: MIT
+#include "main/files/otherCase.hpp"
+
+#include <string>
+
+#include <git2/errors.h>
+#include <gtest/gtest.h>
+
+#include "ObstacleFixture.hpp"
+
+namespace
+{
+
+using vclink::test::Failure;
+using vclink::test::failureOf;
+
+/// `core.ignorecase`, which git sets on some file systems, in a history that has two names which
+/// differ only in case. libgit2 finds one of them by either name.
+class OtherCase : public vclink::test::ObstacleFixture
+{
+  protected:
+    OtherCase()
+    {
+        repository_.write("readme", "of main\n");
+        repository_.commitAll("readme");
+    }
+    void ignoreCase() const
+    {
+        repository_.git({"config", "core.ignorecase", "true"});
+    }
+};
+
+TEST_F(OtherCase, AddedByTheirsIsRefusedInAMerge)
+{
+    diverge(writing("ours", "x"), writing("README", "theirs\n"));
+    ignoreCase();
+    expectMergeRefused(refusal("the names 'README' and 'readme' differ only in case, and "
+                               "'core.ignorecase' is set: merge with 'git merge'"));
+}
+
+TEST_F(OtherCase, OfAChangedFileIsRefusedInACommit)
+{
+    repository_.write("README", "other\n");
+    repository_.commitAll("both");
+    ignoreCase();
+    repository_.write("file", "changed\n");
+    EXPECT_NO_THROW(adapter_->commit(upath(), u"another file"));
+    for (const std::string name : {"README", "readme"})
+    {
+        const std::string before = repository_.read(name);
+        repository_.write(name, "changed\n");
+        expectNothingChanges(
+            [this]
+            {
+                EXPECT_EQ(failureOf([this] { adapter_->commit(upath(), u"one of both"); }),
+                          (Failure{GIT_ERROR, GIT_ERROR_INDEX,
+                                   "the names 'README' and 'readme' differ only in case, and "
+                                   "'core.ignorecase' is set: commit with 'git commit', or rename "
+                                   "one of them"}));
+            });
+        repository_.write(name, before);
+    }
+}
+
+} // namespace
