@@ -35,12 +35,17 @@ bool hasLinkAbove(const std::string &workdir, const std::string &path)
     return false;
 }
 
-/// Whether the index has it as an empty file of this mode.
-bool isStaged(git_index *index, const ChangedFile &file)
+/// Whether libgit2 would fail at the empty file, or leave the mark of `git add --intent-to-add`.
+bool isLeft(git_index *index, const ChangedFile &file)
 {
     const git_index_entry *const entry =
         git_index_get_bypath(index, file.path.c_str(), GIT_INDEX_STAGE_NORMAL);
-    return entry != nullptr && isEmptyBlob(entry->id) && entry->mode == file.mode;
+    if (entry != nullptr && (entry->flags_extended & GIT_INDEX_ENTRY_INTENT_TO_ADD) != 0)
+    {
+        return true;
+    }
+    const bool isStaged = entry != nullptr && isEmptyBlob(entry->id) && entry->mode == file.mode;
+    return endsAtEmptiedFiles && !isStaged;
 }
 
 } // namespace
@@ -48,13 +53,9 @@ bool isStaged(git_index *index, const ChangedFile &file)
 void stageEmptiedFiles(git_repository *repository, git_index *index,
                        const std::vector<ChangedFile> &files)
 {
-    if (!endsAtEmptiedFiles)
-    {
-        return;
-    }
     for (const ChangedFile &file : files)
     {
-        if (file.isEmpty && !isStaged(index, file) &&
+        if (file.isEmpty && isLeft(index, file) &&
             !hasLinkAbove(git_repository_workdir(repository), file.path))
         {
             check(git_index_add_bypath, index, file.path.c_str());

@@ -15,7 +15,11 @@ namespace vclink::git
 /// every modified tracked file, listed or not, and free a static buffer for such a file. A file
 /// that is staged by its path needs no comparison. Call before them for the changed files that they
 /// stage, and hold the others: see HeldEntries. Stages the empty ones that are not staged yet, in
-/// memory. With later releases it does nothing. git_index_add_bypath.
+/// memory. git_index_add_bypath.
+///
+/// Also stages those that are only intended to be added (`git add --intent-to-add`), with any
+/// release: libgit2 would commit them and leave the mark, with which git's next commit would delete
+/// them.
 ///
 /// It does not help if another program empties a file after it was examined.
 /// @throws LibGit2Exception

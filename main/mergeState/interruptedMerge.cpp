@@ -118,7 +118,11 @@ struct Search
     const std::vector<OwnedHandle<git_tree>> &bases;
     const git_tree *ours;
     git_index *index;
-    bool isOneSided = false;
+    bool hasChange = false;
+    bool hasNewFile = false;
+    /// A file that they have deleted, and we too, or changed. They may have renamed it, and their
+    /// new file is part of a conflict then.
+    bool mayBeRenamed = false;
     bool isTaken = false;
 };
 
@@ -144,8 +148,12 @@ int lookAt(const git_diff * /*diff*/, const git_diff_delta *delta, const char * 
         const File ours = findInTree(search.ours, path);
         if (isUntouched(search, path, before, ours))
         {
-            search.isOneSided = true;
+            (before.mode == 0 ? search.hasNewFile : search.hasChange) = true;
             search.isTaken = !(findInIndex(search.index, path) == ours);
+        }
+        else if (delta->status == GIT_DELTA_DELETED)
+        {
+            search.mayBeRenamed = true;
         }
         return search.isTaken ? GIT_EUSER : skip;
     }
@@ -179,7 +187,7 @@ bool isNothingTaken(git_repository *repository, const git_commit *ours, const gi
         return false;
     }
     compared.value();
-    return search.isOneSided;
+    return search.hasChange || (search.hasNewFile && !search.mayBeRenamed);
 }
 
 } // namespace

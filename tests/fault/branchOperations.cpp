@@ -129,6 +129,7 @@ std::vector<Operation> branchOperations()
         {"switchToCurrentBranch", makeBranches, doing(switchToCurrentBranch), refused, abort},
         {"switchBranchUnderLink", makeLinkedFolder, doing(switchBranch), refused, abort},
         {"switchBranchOverFolder", makeReplacedFolder, doing(switchBranch), refused, abort},
+        {"switchBranchInPartialClone", makePromising, doing(switchBranch), refused, abort},
         {"switchBranchWithSubmodules", makeSubmodules, doing(switchBranch), refused, abort},
         {"createBranch", makeBranches, doing(createBranch), refused, {{"branch", "-D", "fresh"}}},
         {"deleteBranch", makeBranches, doing(deleteBranch), refused, {{"branch", "topic"}}},

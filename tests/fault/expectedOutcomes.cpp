@@ -182,6 +182,8 @@ std::vector<Tolerance> tolerancesOfOthers(const std::string &operation, const st
                    "the conflict in 'file' cannot be written beside 'file.lock': merge with 'git "
                    "merge'")},
         {"merge", "git_merge_bases", any, GIT_ENOTFOUND, normal},
+        // Only no is an answer.
+        {"switchBranchInPartialClone", "git_odb_exists", any, any, normal},
         // A state without a name.
         {"getRepositoryState", "git_repository_state", any, any, "done: "},
         // Any state but the normal one refuses the merge, any answer but no means conflicts.

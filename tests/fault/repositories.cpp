@@ -148,6 +148,12 @@ void makeReplacedFolder(GitRepository &repository)
     repository.git({"checkout", "--quiet", "main"});
 }
 
+void makePromising(GitRepository &repository)
+{
+    makeBranches(repository);
+    repository.write(".git/objects/pack/pack-of-another-repository.promisor", "");
+}
+
 void makeUpToDate(GitRepository &repository)
 {
     makeBranches(repository);

@@ -34,6 +34,8 @@ void makeBranches(GitRepository &repository);
 void makeLinkedFolder(GitRepository &repository);
 /// Plain with "folder/deep/inside", and the branch "topic", where "folder" is a file.
 void makeReplacedFolder(GitRepository &repository);
+/// makeBranches(), where contents may be missing. None is.
+void makePromising(GitRepository &repository);
 /// Branches, with main where "topic" is.
 void makeUpToDate(GitRepository &repository);
 /// Branches, with another change of other files on main.

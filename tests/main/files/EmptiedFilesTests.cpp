@@ -151,6 +151,16 @@ TEST_F(EmptiedFiles, AreCommittedOfAConflict)
     EXPECT_EQ(parents().size(), 2U);
 }
 
+/// git's next commit would delete them.
+TEST_F(EmptiedFiles, OnlyIntendedToBeAddedAreCommittedWithoutThatMark)
+{
+    repository_.write("intended", "");
+    repository_.git({"add", "--intent-to-add", "intended"});
+    commit();
+    repository_.git({"commit", "--quiet", "--allow-empty", "--message=next"});
+    EXPECT_EQ(repository_.git({"ls-tree", "--name-only", "HEAD", "intended"}), "intended\n");
+}
+
 TEST_F(EmptiedFiles, FailAsBeforeWhereAnotherFileFails)
 {
     commitAttributes();

@@ -368,6 +368,18 @@ TEST_F(InterruptedMerge, IsNoneOfThese)
     expectConcluded();
 }
 
+/// Their new file is the other half of a conflict.
+TEST_F(InterruptedMerge, IsNoneOfARenameThatIsResolvedToOurs)
+{
+    diverge(removes("file"), [](const GitRepository &repository)
+            { repository.git({"mv", "file", "renamed"}); });
+    expectConflicts("topic");
+    repository_.remove("renamed");
+    for (const auto *name : {"file", "renamed"})
+        adapter_->markResolved(asPath(repository_ / name));
+    expectConcluded();
+}
+
 TEST_F(InterruptedMerge, IsNoneOfSeveralHeads)
 {
     makeDiverged();
