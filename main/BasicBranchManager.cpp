@@ -103,8 +103,11 @@ void refuseOtherReference(const git_reference *branch, const git_object *target,
     const OwnedHandle<git_object> commit =
         acquire<git_object>(git_reference_peel, branch, GIT_OBJECT_COMMIT).value();
     const auto found = acquire<git_object>(git_object_peel, target, GIT_OBJECT_COMMIT);
-    const bool isSame = found.has_value() &&
-                        isSameId(*git_object_id(commit.get()), *git_object_id(found.value().get()));
+    const int code = found.has_error() ? found.error().getCode() : 0;
+    // A tag can name something else.
+    const bool isCommit = code != GIT_EINVALIDSPEC && code != GIT_EPEEL;
+    const bool isSame =
+        isCommit && isSameId(*git_object_id(commit.get()), *git_object_id(found.value().get()));
     if (!isSame)
     {
         raiseGitError(GIT_EAMBIGUOUS, GIT_ERROR_REFERENCE,

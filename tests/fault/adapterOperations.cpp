@@ -139,6 +139,7 @@ std::vector<Operation> adapterOperations()
         {"commitNothing", makeUnindexed, commit},
         {"commitUnreadable", makeUnreadable, commit},
         {"commitMerge", makeMerging, commit},
+        {"commitMergeWithoutMark", makeMergingWithoutMark, commit},
         {"commitMergeOfSubmodule", makeMergingSubmodule, commit},
     };
 }

@@ -191,12 +191,8 @@ std::vector<Tolerance> tolerancesOfOthers(const std::string &operation, const st
         {"merge", "git_repository_state", 2, any, badState},
         {"merge", "git_repository_state", 3, any, isOtherMerge},
         // The library ends the comparison itself as soon as it has seen something of that.
-        {"mergeThreeWay", "git_diff_tree_to_tree", any, any, normal, true},
-        {"mergeBesideHidden", "git_diff_tree_to_tree", any, any, normal, true},
-        {"mergeOverIgnored", "git_diff_tree_to_tree", any, any, normal, true},
-        {"mergeBesideLock", "git_diff_tree_to_tree", any, any, normal, true},
-        {"mergeFileAndFolder", "git_diff_tree_to_tree", 2, any, normal, true},
-        {"mergeSubmodules", "git_diff_tree_to_tree", any, any, normal, true},
+        {"commitMergeWithoutMark", "git_diff_tree_to_tree", any, any, normal, true},
+        {"commitMergeWithoutMark", "git_merge_bases", any, GIT_ENOTFOUND, normal},
         {"merge", "git_index_has_conflicts", any, any, hasConflicts},
         // The first look-up chooses the words of the message, the second is the commit's, after
         // those of the look before the merge.

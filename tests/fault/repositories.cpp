@@ -210,6 +210,13 @@ void makeDivergedSubmodules(GitRepository &repository)
     repository.commit("on main");
 }
 
+void makeMergingWithoutMark(GitRepository &repository)
+{
+    makeMerging(repository);
+    repository.remove(".git/AUTO_MERGE");
+    repository.write(".git/MERGE_MODE", "no-ff");
+}
+
 void makeMergingSubmodule(GitRepository &repository)
 {
     makePlain(repository);

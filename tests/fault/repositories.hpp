@@ -49,6 +49,8 @@ void makeIgnored(GitRepository &repository);
 void makeSubmodules(GitRepository &repository);
 /// The same, with another change on main.
 void makeDivergedSubmodules(GitRepository &repository);
+/// makeMerging(), as if another program had merged through libgit2.
+void makeMergingWithoutMark(GitRepository &repository);
 /// Stopped in a merge that has moved the submodule "moved".
 void makeMergingSubmodule(GitRepository &repository);
 /// Diverged, and stopped in a merge without conflicts.

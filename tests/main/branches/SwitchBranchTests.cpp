@@ -2,6 +2,7 @@
 #include <functional>
 #include <memory>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include <git2.h>
@@ -134,9 +135,11 @@ TEST_F(SwitchBranch, TakesLocalBranchesOnly)
 /// libgit2 would write the files of the other reference.
 TEST_F(SwitchBranch, IsRefusedIfTheNameMeansAnotherCommitFirst)
 {
-    for (const std::string reference : {"refs/topic", "refs/tags/topic"})
+    const std::vector<std::pair<std::string, std::string>> others{
+        {"refs/topic", "main"}, {"refs/tags/topic", "main"}, {"refs/tags/topic", "topic:a"}};
+    for (const auto &[reference, target] : others)
     {
-        repository_.git({"update-ref", reference, "main"});
+        repository_.git({"update-ref", reference, target});
         expectRefused("topic", {GIT_EAMBIGUOUS, GIT_ERROR_REFERENCE,
                                 "'topic' is also another reference, which comes before the branch: "
                                 "switch with 'git switch', or rename one of them"});
