@@ -371,12 +371,30 @@ TEST_F(InterruptedMerge, IsNoneOfThese)
 /// Their new file is the other half of a conflict.
 TEST_F(InterruptedMerge, IsNoneOfARenameThatIsResolvedToOurs)
 {
-    diverge(removes("file"), [](const GitRepository &repository)
-            { repository.git({"mv", "file", "renamed"}); });
+    diverge(removes("file"),
+            [](const GitRepository &repository) {
+                repository.git({"mv", "file", "renamed"});
+            });
     expectConflicts("topic");
     repository_.remove("renamed");
     for (const auto *name : {"file", "renamed"})
         adapter_->markResolved(asPath(repository_ / name));
+    expectConcluded();
+}
+
+/// A merge takes nothing of it.
+TEST_F(InterruptedMerge, IsNoneOfATypeThatChangesWhereOursIsRenamed)
+{
+    diverge(
+        [this] {
+            repository_.git({"mv", "file", "renamed"});
+        },
+        [this]
+        {
+            repository_.remove("file");
+            repository_.symlink("other", "file");
+        });
+    beginMergeAsLibGit2();
     expectConcluded();
 }
 
