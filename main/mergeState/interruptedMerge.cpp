@@ -120,8 +120,8 @@ struct Search
     git_index *index;
     bool hasChange = false;
     bool hasNewFile = false;
-    /// A file that they have deleted, and we too, or changed. They may have renamed it, and their
-    /// new file is part of a conflict then.
+    /// They have deleted a file that we have deleted or changed. If they have renamed it, their new
+    /// file is part of a conflict. A file that becomes a link is such a file, too.
     bool mayBeRenamed = false;
     bool isTaken = false;
 };
@@ -174,8 +174,6 @@ bool isNothingTaken(git_repository *repository, const git_commit *ours, const gi
     Search search{bases, oursTree.get(), index.get()};
     git_diff_options options{};
     check(git_diff_options_init, &options, unsigned{GIT_DIFF_OPTIONS_VERSION});
-    // Otherwise a file that becomes a link is a new one, which a file that ours has renamed is not.
-    options.flags = GIT_DIFF_INCLUDE_TYPECHANGE;
     options.notify_cb = lookAt;
     options.payload = &search;
     git_diff *raw = nullptr;
