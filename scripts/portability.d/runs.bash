@@ -38,8 +38,8 @@ program_result()
         END { if (all == "" || passed == "") exit 1; print passed " of " all " cases" }' "$1"
 }
 
-# record DOCUMENT SYSTEM TESTS COMMIT RESULT: a line with today's date, in place of the line of these
-# tests on the same system. SYSTEM has the first columns, separated by " | ".
+# record DOCUMENT SYSTEM TESTS COMMIT RESULT: a line with today's date below the other lines of this
+# system, in place of the line of these tests. SYSTEM has the first columns, separated by " | ".
 record()
 {
     local document=$1 key="| $2 | $3 |" new
@@ -47,10 +47,18 @@ record()
         echo "$document has no place for runs" >&2
         return 1
     fi
-    new=$(awk -v key="$key" -v line="$key $(date +%F) | $4 | $5 |" '
+    new=$(awk -v on="| $2 |" -v key="$key" -v line="$key $(date +%F) | $4 | $5 |" '
         index($0, key) == 1 { next }
-        $0 == "<!-- end of runs -->" { print line }
-        { print }' "$document")
+        { lines[++count] = $0 }
+        index($0, on) == 1 { last = count }
+        $0 == "<!-- end of runs -->" { end = count - 1 }
+        END {
+            if (last == 0) last = end
+            for (i = 1; i <= count; ++i) {
+                print lines[i]
+                if (i == last) print line
+            }
+        }' "$document")
     # In place: the file is shared with a root folder, by a mount.
     printf '%s\n' "$new" >"$document"
 }

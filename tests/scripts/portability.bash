@@ -86,8 +86,8 @@ is 'three runs' "| Owl 12 | gcc 1 | 1.5 | 1.7 | unit | $today | $head | 3 of 3 |
 is 'the table is not a change' "$head" commit_of .
 record "$page" 'Owl 12 | gcc 1 | 1.5 | 1.7' unit "$head" '2 of 3'
 is 'a second run' "| Owl 12 | gcc 1 | 1.5 | 1.7 | git | $today | $head | 4 of 4 |
-| Owl 12 | gcc 1 | 1.5 | 1.74 | unit | $today | $head | 5 of 5 |
 | Owl 12 | gcc 1 | 1.5 | 1.7 | unit | $today | $head | 2 of 3 |
+| Owl 12 | gcc 1 | 1.5 | 1.74 | unit | $today | $head | 5 of 5 |
 <!-- end of runs -->" sed -n '3,/end of runs/p' "$page"
 is 'text around' $'before\nafter \\n' sed '2,/end of runs/d' "$page"
 cp owl other
