@@ -21,25 +21,30 @@ bool isFolder(const git_tree *tree, const std::string &path)
     return entry != nullptr && git_tree_entry_type(entry.get()) == GIT_OBJECT_TREE;
 }
 
-bool isIn(const git_tree *base, const std::string &path, const git_tree_entry *file)
+using Bases = std::vector<OwnedHandle<git_tree>>;
+
+/// Returns true if all bases have the file as this side has it. Then only the other side has
+/// changed it, which is no conflict.
+bool isInAll(const Bases &bases, const std::string &path, const git_tree_entry *file)
 {
-    const OwnedTreeEntry entry = findInTree(base, path);
-    return entry != nullptr &&
-           isSameId(*git_tree_entry_id(entry.get()), *git_tree_entry_id(file)) &&
-           git_tree_entry_filemode(entry.get()) == git_tree_entry_filemode(file);
+    return std::all_of(
+        bases.begin(), bases.end(),
+        [&](const OwnedHandle<git_tree> &base)
+        {
+            const OwnedTreeEntry entry = findInTree(base.get(), path);
+            return entry != nullptr && file != nullptr &&
+                   isSameId(*git_tree_entry_id(entry.get()), *git_tree_entry_id(file)) &&
+                   git_tree_entry_filemode(entry.get()) == git_tree_entry_filemode(file);
+        });
 }
 
 /// @param change from our side to theirs
-Finding findFileAndFolder(const WorkingCopy &copy, const TreeChange &change,
-                          const std::vector<OwnedHandle<git_tree>> &bases, const git_tree *theirs)
+Finding findFileAndFolder(const WorkingCopy &copy, const TreeChange &change, const git_tree *theirs)
 {
     const git_tree_entry *const file = change.before != nullptr ? change.before : change.after;
     const git_tree *const other = change.before != nullptr ? theirs : copy.head();
     const bool isOneSided = change.before == nullptr || change.after == nullptr;
-    if (!isOneSided || isGitlink(file) || !isFolder(other, change.path) ||
-        std::all_of(bases.begin(), bases.end(),
-                    [&](const OwnedHandle<git_tree> &base)
-                    { return isIn(base.get(), change.path, file); }))
+    if (!isOneSided || isGitlink(file) || !isFolder(other, change.path))
     {
         return {};
     }
@@ -60,7 +65,14 @@ Finding findBetweenSides(git_repository *repository, WorkingCopy &copy,
                          found = findLockBesideFile(copy, change, theirs);
                          if (!found)
                          {
-                             found = findFileAndFolder(copy, change, bases, theirs);
+                             found = findFileAndFolder(copy, change, theirs);
+                         }
+                         const bool isClean =
+                             found && (isInAll(bases, change.path, change.before) ||
+                                       isInAll(bases, change.path, change.after));
+                         if (isClean)
+                         {
+                             found.reset();
                          }
                          return !found;
                      });

@@ -105,4 +105,15 @@ TEST_F(MergeBases, TogetherCanMakeAConflictOfAFileAndAFolder)
         "merge with 'git merge'");
 }
 
+TEST_F(MergeBases, LetAFileBesideALockChangeOnOneSide)
+{
+    repository_.git({"checkout", "--quiet", "topic"});
+    repository_.write("file.lock", "tracked\n");
+    repository_.write("file", "theirs\n");
+    repository_.commitAll("beside a lock");
+    repository_.git({"checkout", "--quiet", "main"});
+    expectConflicts("topic");
+    EXPECT_EQ(repository_.read("file"), "theirs\n");
+}
+
 } // namespace
