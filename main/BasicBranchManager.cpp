@@ -95,8 +95,8 @@ void refuseCheckedOutElsewhere(const git_reference *branch)
     }
 }
 
-/// Refuses the files of another reference: a tag, refs/stash or a remote's branch can have the
-/// branch's short name, and come first where names are looked up.
+/// Refuses the files of another reference: a tag, or refs/stash, can have the branch's short name,
+/// and libgit2 finds these first.
 void refuseOtherReference(const git_reference *branch, const git_object *target,
                           const std::string &name)
 {
