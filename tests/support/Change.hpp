@@ -14,6 +14,8 @@ namespace vclink::test
 /// What is done in a working copy, for the rows of a table.
 using Change = std::function<void(const GitRepository &)>;
 
+inline const Change changesNothing = [](const GitRepository &) {};
+
 inline Change operator+(const Change &first, const Change &second)
 {
     return [=](const GitRepository &copy)
@@ -26,6 +28,21 @@ inline Change operator+(const Change &first, const Change &second)
 inline Change writes(const std::string &name, const std::string &bytes)
 {
     return [=](const GitRepository &copy) { copy.write(name, bytes); };
+}
+
+/// The same in each of these files.
+inline Change writesEach(const std::vector<std::string> &names, const std::string &bytes)
+{
+    return [=](const GitRepository &copy)
+    {
+        for (const auto &name : names)
+            copy.write(name, bytes);
+    };
+}
+
+inline Change makesFolder(const std::string &name)
+{
+    return [=](const GitRepository &copy) { copy.makeFolder(name); };
 }
 
 inline Change removes(const std::string &name)

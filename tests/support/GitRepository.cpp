@@ -193,6 +193,22 @@ std::string GitRepository::commitAll(const std::string &message)
     return commit(message);
 }
 
+std::string GitRepository::commitAll(const std::function<void(const GitRepository &)> &change,
+                                     const std::string &message)
+{
+    change(*this);
+    return commitAll(message);
+}
+
+void GitRepository::makeBranch(const std::string &name,
+                               const std::function<void(const GitRepository &)> &change,
+                               const std::string &start)
+{
+    git({"checkout", "--quiet", "-b", name, start});
+    commitAll(change, "on " + name);
+    git({"checkout", "--quiet", "main"});
+}
+
 std::string GitRepository::git(const std::vector<std::string> &arguments) const
 {
     return runOrThrow(command(arguments));

@@ -2,6 +2,7 @@
 #pragma once
 
 #include <filesystem>
+#include <functional>
 #include <string>
 #include <vector>
 
@@ -53,6 +54,13 @@ class GitRepository
     std::string commit(const std::string &message);
     /// add() of everything, and commit().
     std::string commitAll(const std::string &message);
+    /// The same, after `change`.
+    std::string commitAll(const std::function<void(const GitRepository &)> &change,
+                          const std::string &message);
+    /// Makes the branch at `start`, has `change` committed there and comes back to main.
+    void makeBranch(const std::string &name,
+                    const std::function<void(const GitRepository &)> &change,
+                    const std::string &start = "main");
 
     /// Runs git in the working copy.
     /// @return what it wrote to standard output

@@ -123,9 +123,9 @@ class CallsOfAMerge : public BranchCallsFixture
   protected:
     void makeConflicts()
     {
-        repository_.write(".gitattributes", "binary -merge\n");
-        repository_.write("binary", "ancestor\n");
-        repository_.commitAll("attributes");
+        repository_.commitAll(writes(".gitattributes", "binary -merge\n") +
+                                  writes("binary", "ancestor\n"),
+                              "attributes");
         diverge(writes("file", "ours\n") + writes("binary", "ours\n"),
                 writes("file", "theirs\n") + writes("binary", "theirs\n"));
     }

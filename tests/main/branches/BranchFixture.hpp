@@ -7,6 +7,7 @@
 
 #include "main/AdapterFixture.hpp"
 #include "resource_core/BaseMsgID.hpp"
+#include "support/Change.hpp"
 #include "support/Failure.hpp"
 #include "support/RepositoryState.hpp"
 #include "vclink/git/BranchManager.hpp"
@@ -36,6 +37,12 @@ class BranchFixture : public AdapterFixture
     std::string currentBranch() const;
     /// git's status, an entry a path.
     std::vector<std::string> status() const;
+    /// Makes the branch at `start`, has `change` committed there and comes back to main.
+    void makeBranch(const std::string &name, const Change &change,
+                    const std::string &start = "main")
+    {
+        repository_.makeBranch(name, change, start);
+    }
 
     GitRepository repository_ = makeRepository();
     const std::unique_ptr<git::GitAdapter> adapter_ = makeAdapter(repository_.path());

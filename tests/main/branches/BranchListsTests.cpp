@@ -62,8 +62,7 @@ TEST_F(BranchLists, HoldTheFullNameOfEachBranchOnceOnItsOwnSideAsGitDoes)
     repository_.git({"branch", "loose"});
     repository_.git({"tag", "v1"});
     repository_.git({"symbolic-ref", "refs/heads/alias", "refs/heads/main"});
-    repository_.write(".git/refs/heads/broken", "garbage\n");
-    repository_.commitAll("main is loose, too");
+    repository_.commitAll(writes(".git/refs/heads/broken", "garbage\n"), "main is loose, too");
     for (const std::string name : {"origin/main", "upstream/topic"})
         repository_.git({"update-ref", "refs/remotes/" + name, "HEAD"});
     const std::vector<std::string> expected{"refs/heads/alias", "refs/heads/caf\xE9",

@@ -41,10 +41,8 @@ class BranchRevisions : public BranchFixture
 
 TEST_F(BranchRevisions, AreWhatGitNames)
 {
-    repository_.write("folder/file", "one");
-    repository_.commitAll("first");
-    repository_.write("folder/file", "two");
-    repository_.commitAll("second");
+    repository_.commitAll(writes("folder/file", "one"), "first");
+    repository_.commitAll(writes("folder/file", "two"), "second");
     repository_.git({"tag", "light"});
     repository_.git({"branch", "folder/topic", "HEAD~1"});
     repository_.git({"update-ref", "refs/remotes/origin/main", "HEAD~1"});

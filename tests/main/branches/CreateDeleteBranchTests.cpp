@@ -22,11 +22,9 @@ class BranchChangeTest : public BranchFixture
   protected:
     BranchChangeTest()
     {
-        repository_.write("file", "one\n");
-        repository_.commitAll("first");
+        repository_.commitAll(writes("file", "one\n"), "first");
         repository_.git({"tag", "first"});
-        repository_.write("file", "two\n");
-        repository_.commitAll("second");
+        repository_.commitAll(writes("file", "two\n"), "second");
     }
 
     void create(const std::string &name, const std::string &startPoint) const

@@ -64,9 +64,8 @@ class LockedReference : public MergeFixture, public testing::WithParamInterface<
   protected:
     LockedReference()
     {
-        makeBranch("apart", writing("apart", "x"));
-        repository_.write("later", "x");
-        repository_.commitAll("later");
+        makeBranch("apart", writes("apart", "x"));
+        repository_.commitAll(writes("later", "x"), "later");
         makeAhead();
         repository_.git({"branch", "packed"});
         repository_.git({"pack-refs", "--all"});

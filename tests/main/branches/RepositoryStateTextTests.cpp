@@ -25,16 +25,12 @@ class RepositoryStateText : public BranchFixture
   protected:
     RepositoryStateText()
     {
-        repository_.write("file", "one\n");
-        repository_.commitAll("first");
+        repository_.commitAll(writes("file", "one\n"), "first");
         repository_.git({"checkout", "--quiet", "-b", "topic"});
-        repository_.write("file", "of topic\n");
-        repository_.commitAll("second");
-        repository_.write("file", "more of topic\n");
-        repository_.commitAll("third");
+        repository_.commitAll(writes("file", "of topic\n"), "second");
+        repository_.commitAll(writes("file", "more of topic\n"), "third");
         repository_.git({"checkout", "--quiet", "main"});
-        repository_.write("file", "of main\n");
-        repository_.commitAll("fourth");
+        repository_.commitAll(writes("file", "of main\n"), "fourth");
     }
 
     void expectState(const std::string &text, int number) const

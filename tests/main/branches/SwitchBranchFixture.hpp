@@ -21,15 +21,9 @@ class SwitchBranchFixture : public BranchFixture
   protected:
     SwitchBranchFixture()
     {
-        for (const auto *name : {"a", "b", "same"})
-            repository_.write(name, "of main\n");
-        repository_.commitAll("first");
-        repository_.git({"checkout", "--quiet", "-b", "topic"});
-        repository_.write("a", "of topic, and longer\n");
-        repository_.remove("b");
-        repository_.write("folder/new", "x");
-        repository_.commitAll("topic");
-        repository_.git({"checkout", "--quiet", "main"});
+        repository_.commitAll(writesEach({"a", "b", "same"}, "of main\n"), "first");
+        makeBranch("topic", writes("a", "of topic, and longer\n") + removes("b") +
+                                writes("folder/new", "x"));
     }
 
     void switchTo(const std::string &name) const

@@ -36,8 +36,7 @@ TEST_F(SwitchBranch, MovesTheWorkingTreeTheIndexAndTheHeadAsGitDoes)
     const std::string modes = "feature/gr\xC3\xBC\xC3\x9F";
     repository_.git({"checkout", "--quiet", "-b", modes});
     repository_.setMode("a", 0755);
-    repository_.symlink("a", "link");
-    repository_.commitAll("modes");
+    repository_.commitAll(links("a", "link"), "modes");
     repository_.git({"checkout", "--quiet", "main"});
     for (const std::string &name : {std::string("topic"), modes, std::string("main")})
     {

@@ -13,8 +13,7 @@
 namespace
 {
 
-using vclink::test::Failure;
-using vclink::test::GitRepository;
+using namespace vclink::test;
 
 /// An operation of git that is not over, and its name in the refusal.
 struct UnfinishedOperation
@@ -61,24 +60,22 @@ const UnfinishedOperation unfinishedOperations[]{
      }}};
 
 /// "main" and "topic" change the same line of "file"; "aside" adds a file.
-class Unfinished : public vclink::test::MergeFixture,
-                   public testing::WithParamInterface<UnfinishedOperation>
+class Unfinished : public MergeFixture, public testing::WithParamInterface<UnfinishedOperation>
 {
   protected:
     Unfinished()
     {
-        makeBranch("other-branch", writing("new", "x"));
-        makeBranch("aside", writing("aside", "x"));
-        diverge(writing("file", "ours\n"), writing("file", "theirs\n"));
-        repository_.write("file", "ours, again\n");
-        repository_.commitAll("again");
+        makeBranch("other-branch", writes("new", "x"));
+        makeBranch("aside", writes("aside", "x"));
+        diverge(writes("file", "ours\n"), writes("file", "theirs\n"));
+        repository_.commitAll(writes("file", "ours, again\n"), "again");
     }
 };
 
 TEST_P(Unfinished, RefusesASwitchAndChangesNothing)
 {
     GetParam().begin(repository_);
-    const vclink::test::NothingChanges nothing(repository_);
+    const NothingChanges nothing(repository_);
     for (const auto *const branch : {"other-branch", "main"})
     {
         EXPECT_EQ(failureOf([&] { branches().switchBranch(branch); }),

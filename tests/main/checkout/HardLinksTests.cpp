@@ -18,13 +18,11 @@ namespace
 
 namespace fs = std::filesystem;
 using testing::IsEmpty;
-using vclink::test::asPath;
-using vclink::test::giveToUnprivilegedUser;
-using vclink::test::runAsUnprivilegedUser;
+using namespace vclink::test;
 
 /// Files of the working copy that have a further name, for example in a copy of it that was made of
 /// hard links.
-class HardLinks : public vclink::test::ObstacleFixture
+class HardLinks : public ObstacleFixture
 {
   protected:
     HardLinks()
@@ -45,7 +43,7 @@ class HardLinks : public vclink::test::ObstacleFixture
 
 TEST_F(HardLinks, KeepTheirContentInASwitch)
 {
-    makeBranch("topic", writing("file", "theirs\n"));
+    makeBranch("topic", writes("file", "theirs\n"));
     linkOutside("file");
     const std::string before = readOutside("file");
     branches().switchBranch("topic");
@@ -56,7 +54,7 @@ TEST_F(HardLinks, KeepTheirContentInASwitch)
 
 TEST_F(HardLinks, KeepTheirContentInAFastForward)
 {
-    makeBranch("topic", writing("file", "theirs\n"));
+    makeBranch("topic", writes("file", "theirs\n"));
     linkOutside("file");
     const std::string before = readOutside("file");
     merge("topic");
@@ -66,7 +64,7 @@ TEST_F(HardLinks, KeepTheirContentInAFastForward)
 
 TEST_F(HardLinks, KeepTheirContentInAMerge)
 {
-    diverge(writing("ours", "x"), writing("file", "theirs\n"));
+    diverge(writes("ours", "x"), writes("file", "theirs\n"));
     linkOutside("file");
     const std::string before = readOutside("file");
     merge("topic");
@@ -77,9 +75,8 @@ TEST_F(HardLinks, KeepTheirContentInAMerge)
 /// The merge's commit would take a change that nobody has made.
 TEST_F(HardLinks, WithinTheWorkingCopyKeepTheirContentInAMerge)
 {
-    repository_.write("d/g", "f\n");
-    repository_.commitAll("the same twice");
-    diverge(writing("ours", "x"), writing("d/f", "theirs\n"));
+    repository_.commitAll(writes("d/g", "f\n"), "the same twice");
+    diverge(writes("ours", "x"), writes("d/f", "theirs\n"));
     repository_.remove("d/g");
     fs::create_hard_link(repository_ / "d/f", repository_ / "d/g");
     merge("topic");
@@ -100,29 +97,22 @@ TEST_F(HardLinks, KeepTheirContentInARevert)
 
 TEST_F(HardLinks, AreLeftIfTheCheckoutIsRefused)
 {
-    makeBranch("topic",
-               [this]
-               {
-                   repository_.write("file", "theirs\n");
-                   repository_.write("zz", "theirs\n");
-               });
+    makeBranch("topic", writes("file", "theirs\n") + writes("zz", "theirs\n"));
     linkOutside("file");
     repository_.write("zz", "mine\n");
-    EXPECT_EQ(vclink::test::failureOf([this] { branches().switchBranch("topic"); }).code,
-              GIT_ECONFLICT);
+    EXPECT_EQ(failureOf([this] { branches().switchBranch("topic"); }).code, GIT_ECONFLICT);
     EXPECT_TRUE(fs::equivalent(repository_ / "file", outside_ / "file"));
 }
 
 /// libgit2 could write to the file, though not make another.
 TEST_F(HardLinks, InAFolderThatCannotBeWrittenToAreRefused)
 {
-    makeBranch("topic", writing("d/f", "theirs\n"));
+    makeBranch("topic", writes("d/f", "theirs\n"));
     fs::create_hard_link(repository_ / "d/f", outside_ / "f");
     giveToUnprivilegedUser(folder().path());
     repository_.setMode("d", 0555);
     const std::string text = runAsUnprivilegedUser(
-        [this]
-        { return vclink::test::failureOf([this] { branches().switchBranch("topic"); }).text; });
+        [this] { return failureOf([this] { branches().switchBranch("topic"); }).text; });
     repository_.setMode("d", 0755);
     EXPECT_EQ(text, "the file 'd/f' has further names, and its folder cannot be written to");
     EXPECT_EQ(readOutside("f"), "f\n");

@@ -10,44 +10,40 @@
 namespace
 {
 
+using namespace vclink::test;
+
 /// Two histories with two merge bases, which both add "d/p" and "d/q". Ours has deleted them since;
 /// theirs has "d/p" as one base and "d/q" as the other, so that no base alone shows both as
 /// changed.
-class MergeBases : public vclink::test::ObstacleFixture
+class MergeBases : public ObstacleFixture
 {
   protected:
     MergeBases()
     {
-        diverge([this] { writeBoth("of ours\n", "of ours\n"); },
-                [this] { writeBoth("of theirs\n", "of theirs\n"); });
+        diverge(writesEach({"d/p", "d/q"}, "of ours\n"), writesEach({"d/p", "d/q"}, "of theirs\n"));
         repository_.git({"branch", "base", "main"});
         repository_.git({"merge", "--quiet", "--strategy=ours", "topic"});
-        repository_.remove("d/p");
-        repository_.remove("d/q");
-        repository_.commitAll("without both");
+        repository_.commitAll(removes("d/p") + removes("d/q"), "without both");
         repository_.git({"checkout", "--quiet", "topic"});
         repository_.git({"merge", "--quiet", "--strategy=ours", "base"});
-        writeBoth("of ours\n", "of theirs\n");
-        repository_.commitAll("one of each");
+        repository_.commitAll(writes("d/p", "of ours\n") + writes("d/q", "of theirs\n"),
+                              "one of each");
         repository_.git({"checkout", "--quiet", "main"});
     }
 
     /// Has two branches, "one" and "two", change a name and merge each other, so that each keeps
     /// what the other had first. Then merges them.
     void expectBetweenSides(const std::string &name,
-                            const std::function<void(const std::string &)> &change,
+                            const std::function<Change(const std::string &)> &change,
                             const std::string &text)
     {
-        repository_.write(name, "old\n");
-        repository_.write("x.lock", "tracked\n");
-        repository_.commitAll("old");
+        repository_.commitAll(writes(name, "old\n") + writes("x.lock", "tracked\n"), "old");
         repository_.git({"branch", "one"});
         repository_.git({"branch", "two"});
         const auto commitOn = [&](const std::string &branch, const std::string &content)
         {
             repository_.git({"switch", "--quiet", branch});
-            change(content);
-            repository_.commitAll(content);
+            repository_.commitAll(change(content), content);
         };
         commitOn("one", "first\n");
         commitOn("two", "second\n");
@@ -60,27 +56,13 @@ class MergeBases : public vclink::test::ObstacleFixture
         repository_.git({"branch", "--force", "topic", "two"});
         expectMergeRefused(refusal(text));
     }
-
-  private:
-    void writeBoth(const std::string &first, const std::string &second)
-    {
-        repository_.write("d/p", first);
-        repository_.write("d/q", second);
-    }
 };
 
 TEST_F(MergeBases, AreAllLookedAt)
 {
-    ASSERT_EQ(
-        vclink::test::splitLines(repository_.git({"merge-base", "--all", "main", "topic"})).size(),
-        2U);
-    for (const std::string name : {"d/p", "d/q"})
-    {
-        repository_.write(name, "mine\n");
-        expectMergeRefused(inTheWay("untracked file '" + name + "'"));
-        EXPECT_EQ(repository_.read(name), "mine\n");
-        repository_.remove(name);
-    }
+    ASSERT_EQ(splitLines(repository_.git({"merge-base", "--all", "main", "topic"})).size(), 2U);
+    expectEachRefused({{writes("d/p", "mine\n"), inTheWay("untracked file 'd/p'")},
+                       {writes("d/q", "mine\n"), inTheWay("untracked file 'd/q'")}});
     expectConflicts("topic");
 }
 
@@ -88,7 +70,7 @@ TEST_F(MergeBases, AreAllLookedAt)
 TEST_F(MergeBases, TogetherCanMakeAConflictBesideALock)
 {
     expectBetweenSides(
-        "x", [this](const std::string &text) { repository_.write("x", text); },
+        "x", [](const std::string &text) { return writes("x", text); },
         "the conflict in 'x' cannot be written beside 'x.lock': merge with 'git merge'");
 }
 
@@ -96,11 +78,8 @@ TEST_F(MergeBases, TogetherCanMakeAConflictOfAFileAndAFolder)
 {
     expectBetweenSides(
         "y",
-        [this](const std::string &text)
-        {
-            repository_.remove("y");
-            text == "first\n" ? repository_.symlink("file", "y") : repository_.write("y/z", text);
-        },
+        [](const std::string &text)
+        { return removes("y") + (text == "first\n" ? links("file", "y") : writes("y/z", text)); },
         "'y' is a file of one side and a folder of the other, and there are several merge bases: "
         "merge with 'git merge'");
 }

@@ -10,7 +10,9 @@
 namespace
 {
 
-class MergeCommandObstacles : public vclink::test::DrivenMergeFixture
+using namespace vclink::test;
+
+class MergeCommandObstacles : public DrivenMergeFixture
 {
   protected:
     /// Has the command do this in the working copy, and then join the sides.
@@ -22,11 +24,11 @@ class MergeCommandObstacles : public vclink::test::DrivenMergeFixture
     void expectRefused(const std::string &text) const
     {
         const std::string head = idOf("HEAD");
-        const auto index = vclink::test::indexOf(repository_);
-        EXPECT_EQ(failureOfMerge("topic"), vclink::test::textOf(vclink::test::Failure{
-                                               GIT_ECONFLICT, GIT_ERROR_CHECKOUT, text}));
+        const auto index = indexOf(repository_);
+        EXPECT_EQ(failureOfMerge("topic"),
+                  textOf(Failure{GIT_ECONFLICT, GIT_ERROR_CHECKOUT, text}));
         EXPECT_EQ(idOf("HEAD"), head);
-        EXPECT_EQ(vclink::test::indexOf(repository_), index);
+        EXPECT_EQ(indexOf(repository_), index);
         EXPECT_EQ(repository_.read("file"), "ours\n");
         EXPECT_EQ(branches().getRepositoryState(), "Normal");
     }
@@ -51,8 +53,7 @@ TEST_F(MergeCommandObstacles, AreEditsOfTheMergedFileItself)
 TEST_F(MergeCommandObstacles, AreNewFilesThatComeMeanwhile)
 {
     repository_.git({"checkout", "--quiet", "topic"});
-    repository_.write("n/new", "theirs\n");
-    repository_.commitAll("new");
+    repository_.commitAll(writes("n/new", "theirs\n"), "new");
     repository_.git({"checkout", "--quiet", "main"});
     defineSaving("mkdir n && echo mine >n/new");
     expectRefused("the untracked file 'n/new' is in the way of the checkout");
@@ -68,8 +69,7 @@ TEST_F(MergeCommandObstacles, AreNewFilesThatComeMeanwhile)
 TEST_F(MergeCommandObstacles, AreEditsThatGitHides)
 {
     repository_.git({"checkout", "--quiet", "topic"});
-    repository_.write("other", "theirs\n");
-    repository_.commitAll("other");
+    repository_.commitAll(writes("other", "theirs\n"), "other");
     repository_.git({"checkout", "--quiet", "main"});
     repository_.git({"update-index", "--skip-worktree", "other"});
     defineSaving("echo mine >other");

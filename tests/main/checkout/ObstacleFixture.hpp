@@ -5,6 +5,7 @@
 #include <functional>
 #include <stdexcept>
 #include <string>
+#include <vector>
 
 #include <git2.h>
 #include <gtest/gtest.h>
@@ -39,6 +40,49 @@ inline void makeSocket(const std::filesystem::path &path)
     ::close(descriptor);
 }
 
+inline Change makesFifo(const std::string &name)
+{
+    return [=](const GitRepository &copy) { makeFifo(copy / name); };
+}
+
+inline Change makesSocket(const std::string &name)
+{
+    return [=](const GitRepository &copy) { makeSocket(copy / name); };
+}
+
+/// Patterns of ignored files, in place of any others.
+inline Change ignores(const std::string &patterns)
+{
+    return writes(".git/info/exclude", patterns + '\n');
+}
+
+inline Failure refusal(const std::string &text)
+{
+    return {GIT_ECONFLICT, GIT_ERROR_CHECKOUT, text};
+}
+
+inline Failure inTheWay(const std::string &what)
+{
+    return refusal("the " + what + " is in the way of the checkout");
+}
+
+inline Failure staged(const std::string &name)
+{
+    return refusal("the staged changes of '" + name + "' would be lost in the checkout");
+}
+
+inline Failure inChangedFolder(const std::string &what)
+{
+    return refusal("the " + what + " is in a folder that becomes a file");
+}
+
+/// Something of the user's, and the refusal to go on beside it, which names it.
+struct Obstacle
+{
+    Change put;
+    Failure refused;
+};
+
 /// Base of the fixtures whose tests put something in the way of a switch or a merge: "main" with
 /// "file", "other", "d/f" and "d/g", and a folder outside that nobody may touch.
 class ObstacleFixture : public MergeFixture
@@ -46,33 +90,23 @@ class ObstacleFixture : public MergeFixture
   protected:
     ObstacleFixture()
     {
-        repository_.write("d/f", "f\n");
-        repository_.write("d/g", "g\n");
-        repository_.commitAll("folder");
-        for (const auto *name : {"outside/f", "outside/g", "outside/new"})
-            repository_.write(std::string("../") + name, "precious\n");
+        repository_.commitAll(writes("d/f", "f\n") + writes("d/g", "g\n"), "folder");
+        writesEach({"f", "g", "new"}, "precious\n")(outside_);
+        outsideAtFirst_ = workingTreeOf(outside_);
     }
 
+    /// Has these written by the other side, "topic", and something else by ours.
+    void theyWrite(const std::vector<std::string> &names)
+    {
+        diverge(writes("ours", "x"), writesEach(names, "theirs\n"));
+    }
+    void ignore(const std::string &patterns) const
+    {
+        ignores(patterns)(repository_);
+    }
     void expectNothingOutsideChanged() const
     {
-        for (const auto *name : {"outside/f", "outside/g", "outside/new"})
-            EXPECT_EQ(repository_.read(std::string("../") + name), "precious\n");
-    }
-    static Failure refusal(const std::string &text)
-    {
-        return {GIT_ECONFLICT, GIT_ERROR_CHECKOUT, text};
-    }
-    static Failure inTheWay(const std::string &what)
-    {
-        return refusal("the " + what + " is in the way of the checkout");
-    }
-    static Failure staged(const std::string &name)
-    {
-        return refusal("the staged changes of '" + name + "' would be lost in the checkout");
-    }
-    static Failure inChangedFolder(const std::string &what)
-    {
-        return refusal("the " + what + " is in a folder that becomes a file");
+        EXPECT_EQ(workingTreeOf(outside_), outsideAtFirst_);
     }
     /// Expects that `action` changes nothing but ORIG_HEAD, not even the index file's time.
     void expectNothingChanges(const std::function<void()> &action) const
@@ -95,6 +129,31 @@ class ObstacleFixture : public MergeFixture
         expectNothingChanges([&] { EXPECT_EQ(failureOfMerge("topic"), textOf(failure)); });
     }
 
+    void expectSwitches() const
+    {
+        branches().switchBranch("topic");
+        EXPECT_EQ(currentBranch(), "refs/heads/topic");
+    }
+    /// Expects this refusal of the merge.
+    virtual void expectRefused(const Failure &failure) const
+    {
+        expectMergeRefused(failure);
+    }
+    /// Puts each obstacle, expects its refusal, and puts back what was there.
+    void expectEachRefused(const std::vector<Obstacle> &obstacles) const
+    {
+        for (const auto &[put, refused] : obstacles)
+        {
+            SCOPED_TRACE(refused.text);
+            put(repository_);
+            expectRefused(refused);
+            const auto name = refused.text.find('\'') + 1;
+            const auto end = refused.text.find('\'', name);
+            std::filesystem::remove_all(repository_ / refused.text.substr(name, end - name));
+            repository_.git({"reset", "--quiet", "--hard"});
+        }
+    }
+
     /// Gives the working copy to the unprivileged user, runs `action` as that user while a name has
     /// these permissions, expects that nothing changes, and returns what `action` returns.
     std::string runUnprivileged(const std::string &name, mode_t mode,
@@ -111,6 +170,8 @@ class ObstacleFixture : public MergeFixture
         return result;
     }
 
+    const GitRepository outside_{folder() / "outside"};
+
   private:
     RepositoryState stateWithoutOrigHead() const
     {
@@ -118,6 +179,8 @@ class ObstacleFixture : public MergeFixture
         state.underWay.erase("ORIG_HEAD");
         return state;
     }
+
+    RepositoryState::Entries outsideAtFirst_;
 };
 
 } // namespace vclink::test

@@ -11,18 +11,16 @@
 namespace
 {
 
-using vclink::test::Failure;
-using vclink::test::failureOf;
+using namespace vclink::test;
 
 /// `core.ignorecase`, which git sets on some file systems, in a history that has two names which
 /// differ only in case. libgit2 finds one of them by either name.
-class OtherCase : public vclink::test::ObstacleFixture
+class OtherCase : public ObstacleFixture
 {
   protected:
     OtherCase()
     {
-        repository_.write("readme", "of main\n");
-        repository_.commitAll("readme");
+        repository_.commitAll(writes("readme", "of main\n"), "readme");
     }
     void ignoreCase() const
     {
@@ -32,7 +30,7 @@ class OtherCase : public vclink::test::ObstacleFixture
 
 TEST_F(OtherCase, AddedByTheirsIsRefusedInAMerge)
 {
-    diverge(writing("ours", "x"), writing("README", "theirs\n"));
+    diverge(writes("ours", "x"), writes("README", "theirs\n"));
     ignoreCase();
     expectMergeRefused(refusal("the names 'README' and 'readme' differ only in case, and "
                                "'core.ignorecase' is set: merge with 'git merge'"));
@@ -40,8 +38,7 @@ TEST_F(OtherCase, AddedByTheirsIsRefusedInAMerge)
 
 TEST_F(OtherCase, OfAChangedFileIsRefusedInACommit)
 {
-    repository_.write("README", "other\n");
-    repository_.commitAll("both");
+    repository_.commitAll(writes("README", "other\n"), "both");
     ignoreCase();
     repository_.write("file", "changed\n");
     EXPECT_NO_THROW(adapter_->commit(upath(), u"another file"));

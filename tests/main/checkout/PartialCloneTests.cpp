@@ -1,8 +1,6 @@
 // SPDX-License-Identifier: MIT
 #include "main/checkout/PromisedContent.hpp"
 
-#include <functional>
-#include <memory>
 #include <string>
 
 #include <gtest/gtest.h>
@@ -13,23 +11,17 @@
 namespace
 {
 
-using vclink::test::asPath;
-using vclink::test::GitRepository;
+using namespace vclink::test;
 
 /// A clone that has all commits and folders, and only the contents of the checked-out files. git
 /// fetches the others when it needs them, libgit2 does not.
-class PartialClone : public vclink::test::ObstacleFixture
+class PartialClone : public ObstacleFixture
 {
   protected:
     PartialClone()
     {
         makeBranch("topic",
-                   [this]
-                   {
-                       repository_.write("d/f", "theirs\n");
-                       repository_.write("file", "theirs\n");
-                       repository_.remove("other");
-                   });
+                   writes("d/f", "theirs\n") + writes("file", "theirs\n") + removes("other"));
         const auto source = folder() / "source";
         std::filesystem::rename(repository_.path(), source);
         const GitRepository origin(source);
@@ -38,7 +30,7 @@ class PartialClone : public vclink::test::ObstacleFixture
                     repository_.path().string()});
         repository_.git({"branch", "topic", "origin/topic"});
     }
-    static vclink::test::Failure lacking(const std::string &name)
+    static Failure lacking(const std::string &name)
     {
         return refusal("the content of '" + name +
                        "' is not in this partial clone, and only git fetches it: use git for this");
@@ -61,17 +53,14 @@ TEST_F(PartialClone, IsLeftByAFastForwardThatLacksAFile)
 
 TEST_F(PartialClone, IsLeftByAMergeThatLacksAFile)
 {
-    repository_.write("new", "x");
-    repository_.commitAll("ours");
+    repository_.commitAll(writes("new", "x"), "ours");
     expectMergeRefused(lacking("d/f"));
 }
 
 /// There is no notification of this conflict.
 TEST_F(PartialClone, IsLeftByAMergeThatLacksAFileInConflict)
 {
-    repository_.remove("d/f");
-    repository_.remove("file");
-    repository_.commitAll("ours");
+    repository_.commitAll(removes("d/f") + removes("file"), "ours");
     expectMergeRefused(lacking("d/f"));
 }
 
@@ -84,7 +73,7 @@ TEST_F(PartialClone, IsLeftByARevertThatLacksAFile)
         {
             const auto revert = [this]
             { adapter_->revertFiles({asPath((repository_ / "d/f").string())}); };
-            EXPECT_EQ(vclink::test::failureOf(revert), lacking("d/f"));
+            EXPECT_EQ(failureOf(revert), lacking("d/f"));
         });
     EXPECT_EQ(repository_.read("d/f"), "f\n");
 }

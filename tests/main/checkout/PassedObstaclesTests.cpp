@@ -15,32 +15,22 @@ namespace
 
 namespace fs = std::filesystem;
 using testing::IsEmpty;
-using vclink::test::makeFifo;
+using namespace vclink::test;
 
-class PassedObstacles : public vclink::test::ObstacleFixture
+class PassedObstacles : public ObstacleFixture
 {
   protected:
-    /// Diverges; theirs is "topic". "n-b" sorts between "n" and "n/".
-    void theyWrite(const std::vector<std::string> &names)
+    /// "n-b" sorts between "n" and "n/".
+    void theyWriteBesideANeighbour(const std::vector<std::string> &names)
     {
-        repository_.write("n-b", "x");
-        repository_.commitAll("neighbour");
-        diverge(writing("ours", "x"),
-                [&]
-                {
-                    for (const auto &name : names)
-                        repository_.write(name, "theirs\n");
-                });
-    }
-    void ignore(const std::string &pattern)
-    {
-        repository_.write(".git/info/exclude", pattern + '\n');
+        repository_.commitAll(writes("n-b", "x"), "neighbour");
+        theyWrite(names);
     }
 };
 
 TEST_F(PassedObstacles, AreNotIgnoredLinksWhichAreReplacedAsGitDoes)
 {
-    theyWrite({"n-b", "n/new"});
+    theyWriteBesideANeighbour({"n-b", "n/new"});
     ignore("n");
     repository_.symlink("../outside", "n");
     expectCleanAsGit();
@@ -49,7 +39,7 @@ TEST_F(PassedObstacles, AreNotIgnoredLinksWhichAreReplacedAsGitDoes)
 
 TEST_F(PassedObstacles, AreFoldersWithIgnoredFilesWhereAFileComes)
 {
-    theyWrite({"n", "n-b"});
+    theyWriteBesideANeighbour({"n", "n-b"});
     ignore("mine");
     repository_.write("n/mine", "mine\n");
     expectMergeRefused(inTheWay("folder 'n'"));
@@ -59,7 +49,7 @@ TEST_F(PassedObstacles, AreFoldersWithIgnoredFilesWhereAFileComes)
 
 TEST_F(PassedObstacles, AreIgnoredFoldersWhereAFileComes)
 {
-    theyWrite({"n", "n-b"});
+    theyWriteBesideANeighbour({"n", "n-b"});
     ignore("n");
     repository_.write("n/mine", "mine\n");
     expectMergeRefused(inTheWay("folder 'n'"));
@@ -68,7 +58,7 @@ TEST_F(PassedObstacles, AreIgnoredFoldersWhereAFileComes)
 TEST_F(PassedObstacles, AreNotEmptyFoldersInThePlaceOfAFileThatComesBack)
 {
     repository_.write("n", "x");
-    theyWrite({"n-b"});
+    theyWriteBesideANeighbour({"n-b"});
     repository_.remove("n");
     repository_.makeFolder("n");
     merge("topic");
@@ -78,16 +68,10 @@ TEST_F(PassedObstacles, AreNotEmptyFoldersInThePlaceOfAFileThatComesBack)
 
 TEST_F(PassedObstacles, AreNotTrackedFoldersThatBecomeAFile)
 {
-    repository_.write("d-b", "x");
-    repository_.commitAll("neighbour");
-    const auto change = [this]
-    {
-        repository_.remove("d");
-        repository_.write("d", "theirs\n");
-        repository_.write("d-b", "theirs\n");
-    };
+    repository_.commitAll(writes("d-b", "x"), "neighbour");
+    const Change change = removes("d") + writesEach({"d", "d-b"}, "theirs\n");
     makeBranch("ahead", change);
-    diverge(writing("ours", "x"), change);
+    diverge(writes("ours", "x"), change);
     ignore("mine");
     repository_.write("d/mine", "mine\n");
     expectMergeRefused(inChangedFolder("file 'd/mine'"));
@@ -120,7 +104,7 @@ TEST_F(PassedObstacles, AreLinksWhereAnUnrelatedHistoryHasASubmodule)
 /// A conflict is written there, and libgit2 reports none.
 TEST_F(PassedObstacles, AreIgnoredFifosWhereWeDeletedAFileThatTheyChanged)
 {
-    diverge([this] { repository_.remove("d/f"); }, writing("d/f", "theirs\n"));
+    diverge(removes("d/f"), writes("d/f", "theirs\n"));
     ignore("f");
     makeFifo(repository_ / "d/f");
     expectMergeRefused(inTheWay("FIFO, socket or device 'd/f'"));
@@ -129,7 +113,7 @@ TEST_F(PassedObstacles, AreIgnoredFifosWhereWeDeletedAFileThatTheyChanged)
 
 TEST_F(PassedObstacles, AreNotStagedFilesThatAreWhatTheyHave)
 {
-    diverge(writing("ours", "x"), writing("d/new", "theirs\n"));
+    diverge(writes("ours", "x"), writes("d/new", "theirs\n"));
     repository_.write("d/new", "theirs\n");
     repository_.add({"d/new"});
     merge("topic");

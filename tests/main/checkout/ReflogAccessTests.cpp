@@ -10,11 +10,11 @@
 namespace
 {
 
-using vclink::test::failureOf;
+using namespace vclink::test;
 
 /// A reflog that the user may not write to, since root has used git once. libgit2 finds that out
 /// when the reference moves, after the files were written.
-class ReflogAccess : public vclink::test::ObstacleFixture
+class ReflogAccess : public ObstacleFixture
 {
   protected:
     std::string denied(const std::string &what, const std::string &name) const
@@ -25,7 +25,7 @@ class ReflogAccess : public vclink::test::ObstacleFixture
 
 TEST_F(ReflogAccess, IsNeededForASwitch)
 {
-    makeBranch("topic", writing("file", "theirs\n"));
+    makeBranch("topic", writes("file", "theirs\n"));
     EXPECT_EQ(runUnprivileged(
                   ".git/logs/HEAD", 0444,
                   [this] { return failureOf([this] { branches().switchBranch("topic"); }).text; }),
@@ -34,14 +34,14 @@ TEST_F(ReflogAccess, IsNeededForASwitch)
 
 TEST_F(ReflogAccess, IsNeededForFastForwardsAndMerges)
 {
-    makeBranch("ahead", writing("file", "theirs\n"));
-    diverge(writing("ours", "x"), writing("theirs", "x"));
+    makeBranch("ahead", writes("file", "theirs\n"));
+    diverge(writes("ours", "x"), writes("theirs", "x"));
     repository_.git({"branch", "old", "main~"});
     repository_.git({"switch", "--quiet", "old"});
     const auto expectMergesRefused = [this](const std::string &name, const std::string &other)
     {
         EXPECT_EQ(runUnprivileged(name, 0444, [&] { return failureOfMerge(other); }),
-                  vclink::test::textOf({GIT_ERROR, GIT_ERROR_OS, denied("append to", name)}));
+                  textOf({GIT_ERROR, GIT_ERROR_OS, denied("append to", name)}));
     };
     expectMergesRefused(".git/logs/HEAD", "ahead");
     expectMergesRefused(".git/logs/refs/heads/old", "ahead");

@@ -1,7 +1,6 @@
 // SPDX-License-Identifier: MIT
 #include "main/checkout/RenamesToFolders.hpp"
 
-#include <functional>
 #include <string>
 
 #include <gmock/gmock.h>
@@ -13,29 +12,23 @@ namespace
 {
 
 using testing::ElementsAre;
-using Action = std::function<void()>;
+using namespace vclink::test;
 
 /// One side has a file where the other has a folder. "old" and "second" can be renamed.
-class RenamesToFolders : public vclink::test::ObstacleFixture
+class RenamesToFolders : public ObstacleFixture
 {
   protected:
     RenamesToFolders()
     {
-        repository_.write("old", "1\n2\n3\n4\n5\n6\n7\n8\n");
-        repository_.write("second", "a\nb\nc\nd\ne\nf\ng\nh\n");
-        repository_.commitAll("files to rename");
+        repository_.commitAll(writes("old", "1\n2\n3\n4\n5\n6\n7\n8\n") +
+                                  writes("second", "a\nb\nc\nd\ne\nf\ng\nh\n"),
+                              "files to rename");
     }
 
     /// Replaces the folder "d" by "old".
-    Action replacingFolder() const
-    {
-        return [this]
-        {
-            repository_.remove("d");
-            moving("old", "d")();
-        };
-    }
-    void expectRefused(const std::string &name) const
+    const Change replacesFolder_ = removes("d") + moves("old", "d");
+
+    void expectNameRefused(const std::string &name) const
     {
         expectMergeRefused(refusal("'" + name +
                                    "' is a renamed file of one side and a folder of "
@@ -45,63 +38,48 @@ class RenamesToFolders : public vclink::test::ObstacleFixture
 
 TEST_F(RenamesToFolders, RefuseTheMergeIfTheyAreTheirs)
 {
-    diverge(writing("new/inside", "ours\n"), moving("old", "new"));
-    expectRefused("new");
+    diverge(writes("new/inside", "ours\n"), moves("old", "new"));
+    expectNameRefused("new");
     // The files that are missing would be restored.
     repository_.remove("new");
-    expectRefused("new");
+    expectNameRefused("new");
 }
 
 TEST_F(RenamesToFolders, RefuseTheMergeIfTheyAreOurs)
 {
-    diverge(moving("old", "new"), writing("new/deep/inside", "theirs\n"));
-    expectRefused("new");
+    diverge(moves("old", "new"), writes("new/deep/inside", "theirs\n"));
+    expectNameRefused("new");
 }
 
 /// libgit2 would leave both files out of the merge.
 TEST_F(RenamesToFolders, RefuseTheMergeIfTheFolderIsOfARenameToo)
 {
-    diverge(moving("old", "new"),
-            [this]
-            {
-                repository_.makeFolder("new");
-                moving("second", "new/inside")();
-            });
-    expectRefused("new");
+    diverge(moves("old", "new"), makesFolder("new") + moves("second", "new/inside"));
+    expectNameRefused("new");
 }
 
 TEST_F(RenamesToFolders, RefuseTheMergeIfTheFolderHasOurChange)
 {
-    diverge(writing("d/f", "ours\n"), replacingFolder());
-    expectRefused("d");
+    diverge(writes("d/f", "ours\n"), replacesFolder_);
+    expectNameRefused("d");
 }
 
 TEST_F(RenamesToFolders, RefuseTheMergeIfTheFolderHasTheirChange)
 {
-    diverge(replacingFolder(), writing("d/f", "theirs\n"));
-    expectRefused("d");
+    diverge(replacesFolder_, writes("d/f", "theirs\n"));
+    expectNameRefused("d");
 }
 
 TEST_F(RenamesToFolders, RefuseTheMergeIfTheFileHasAlsoChanged)
 {
-    diverge(
-        [this]
-        {
-            repository_.remove("old");
-            repository_.write("new", "1\n2\n3\n4\n5\n6\n7\n8\nours\n");
-        },
-        writing("new/inside", "theirs\n"));
-    expectRefused("new");
+    diverge(removes("old") + writes("new", "1\n2\n3\n4\n5\n6\n7\n8\nours\n"),
+            writes("new/inside", "theirs\n"));
+    expectNameRefused("new");
 }
 
 TEST_F(RenamesToFolders, LeaveANewFileInConflict)
 {
-    diverge(writing("new/inside", "ours\n"),
-            [this]
-            {
-                repository_.remove("old");
-                repository_.write("new", "something else\n");
-            });
+    diverge(writes("new/inside", "ours\n"), removes("old") + writes("new", "something else\n"));
     expectConflicts("topic");
     EXPECT_THAT(conflicts(), ElementsAre("3 new"));
     EXPECT_EQ(repository_.read("new/inside"), "ours\n");
@@ -109,13 +87,13 @@ TEST_F(RenamesToFolders, LeaveANewFileInConflict)
 
 TEST_F(RenamesToFolders, AreMergedIfTheOtherSideLeftTheFolderAlone)
 {
-    diverge(writing("other", "ours\n"), replacingFolder());
+    diverge(writes("other", "ours\n"), replacesFolder_);
     expectCleanAsGit();
 }
 
 TEST_F(RenamesToFolders, AreMergedIfTheyAreOursAndTheOtherSideLeftTheFolderAlone)
 {
-    diverge(replacingFolder(), writing("other", "theirs\n"));
+    diverge(replacesFolder_, writes("other", "theirs\n"));
     expectCleanAsGit();
 }
 

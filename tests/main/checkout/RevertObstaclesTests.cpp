@@ -21,13 +21,7 @@ namespace
 namespace fs = std::filesystem;
 namespace git = vclink::git;
 using testing::Contains;
-using vclink::test::asPath;
-using vclink::test::Failure;
-using vclink::test::failureOf;
-using vclink::test::GitRepository;
-using vclink::test::makeFifo;
-using vclink::test::makeSocket;
-using vclink::test::workingTreeOf;
+using namespace vclink::test;
 
 /// What a record's own notification was told.
 struct Heard
@@ -45,14 +39,13 @@ int hear(git_checkout_notify_t /*why*/, const char *path, const git_diff_file * 
 }
 
 /// A folder and a file of the repository have become links to what lies outside.
-class RevertObstacles : public vclink::test::StagingFixture
+class RevertObstacles : public StagingFixture
 {
   protected:
     RevertObstacles()
     {
-        repository_.write("folder/a", "committed");
-        repository_.write("zlast", "committed");
-        repository_.commitAll("second");
+        repository_.commitAll(writes("folder/a", "committed") + writes("zlast", "committed"),
+                              "second");
         repository_.write("../outside/a", "precious");
         repository_.write("../outside/other", "precious");
         repository_.remove("folder");
@@ -124,8 +117,7 @@ TEST_F(RevertObstacles, LeavesTheLinkOfAFileThatTheCallbackRefuses)
 TEST_F(RevertObstacles, LeavesTrackedAndUntrackedLinksThatAreNotInTheWay)
 {
     ASSERT_EQ(checkOut(), 0);
-    repository_.symlink("zlast", "tracked");
-    repository_.commitAll("third");
+    repository_.commitAll(links("zlast", "tracked"), "third");
     repository_.remove("tracked");
     repository_.symlink("file", "tracked");
     repository_.symlink("zlast", "untracked");
@@ -176,8 +168,7 @@ TEST_F(RevertObstacles, FoldersInThePlaceOfAFileAreReplacedAsGitDoes)
 TEST_F(RevertObstacles, FilesInThePlaceOfAFolderAreReplacedAsGitDoes)
 {
     repository_.git({"reset", "--quiet", "--hard"});
-    repository_.write("sub/other", "x");
-    repository_.commitAll("third");
+    repository_.commitAll(writes("sub/other", "x"), "third");
     repository_.remove("sub");
     repository_.write("sub", "mine\n");
     expectRevertsAsGit({"sub"});
@@ -187,9 +178,7 @@ TEST_F(RevertObstacles, FilesInThePlaceOfAFolderAreReplacedAsGitDoes)
 TEST_F(RevertObstacles, ThatLibGit2IsPastAreRefused)
 {
     repository_.git({"reset", "--quiet", "--hard"});
-    repository_.write("file-b", "x");
-    repository_.write("sub-b", "x");
-    repository_.commitAll("neighbours");
+    repository_.commitAll(writes("file-b", "x") + writes("sub-b", "x"), "neighbours");
     repository_.remove("sub");
     repository_.write("sub", "mine\n");
     repository_.write("sub-b", "edited\n");
@@ -211,8 +200,7 @@ TEST_F(RevertObstacles, ThatLibGit2IsPastAreRefused)
 TEST_F(RevertObstacles, FoldersWithFilesThatLibGit2IsPastAreRefused)
 {
     repository_.git({"reset", "--quiet", "--hard"});
-    repository_.write("file-b", "x");
-    repository_.commitAll("neighbour");
+    repository_.commitAll(writes("file-b", "x"), "neighbour");
     repository_.remove("file");
     repository_.write("file/mine", "mine\n");
     repository_.write("file-b", "edited\n");

@@ -19,12 +19,9 @@ namespace
 namespace fs = std::filesystem;
 namespace git = vclink::git;
 using git::Standing;
-using vclink::test::giveToUnprivilegedUser;
-using vclink::test::makeFifo;
-using vclink::test::makeSocket;
-using vclink::test::runAsUnprivilegedUser;
+using namespace vclink::test;
 
-class StandingOfPaths : public vclink::test::GitFixture
+class StandingOfPaths : public GitFixture
 {
   protected:
     fs::path operator/(const std::string &name) const
@@ -49,7 +46,7 @@ class StandingOfPaths : public vclink::test::GitFixture
         return git::holdsFiles((*this / name).string());
     }
 
-    const vclink::test::LibGit2Session session_{environment()};
+    const LibGit2Session session_{environment()};
 };
 
 TEST_F(StandingOfPaths, IsToldWithoutFollowingLinks)
@@ -169,7 +166,7 @@ TEST_F(ClearedWay, FailsAtWhatItCannotRemove)
             }
             catch (const git::LibGit2Exception &exception)
             {
-                return vclink::test::asUtf8(exception.getError().getMessage());
+                return asUtf8(exception.getError().getMessage());
             }
             return std::string("removed");
         });

@@ -1,5 +1,4 @@
 // SPDX-License-Identifier: MIT
-#include <functional>
 #include <memory>
 #include <string>
 
@@ -16,22 +15,21 @@ namespace
 namespace git = vclink::git;
 using testing::ElementsAre;
 using testing::IsEmpty;
-using vclink::test::Failure;
-using vclink::test::GitRepository;
-using vclink::test::makeFifo;
+using namespace vclink::test;
 
 /// Switches, fast-forwards and merges between branches with and without the submodule "module".
-class SubmoduleObstacles : public vclink::test::ObstacleFixture
+class SubmoduleObstacles : public ObstacleFixture
 {
   protected:
     /// "with" has the submodule, main does not, and its folder is left.
     void makeLeft()
     {
-        repository_.git({"checkout", "--quiet", "-b", "with"});
-        addModule();
-        repository_.write("a first", "x");
-        repository_.commitAll("changed");
-        repository_.git({"checkout", "--quiet", "main"});
+        makeBranch("with",
+                   [this](const GitRepository &copy)
+                   {
+                       addModule();
+                       copy.write("a first", "x");
+                   });
         ASSERT_THAT(status(), ElementsAre("?? module/"));
     }
     /// The same, without the folder.
@@ -41,22 +39,21 @@ class SubmoduleObstacles : public vclink::test::ObstacleFixture
         repository_.remove("module");
     }
     /// main has the submodule, and "topic" something else in its place.
-    void makeReplacing(const std::function<void()> &replace)
+    void makeReplacing(const Change &replace)
     {
         addModule();
-        repository_.git({"checkout", "--quiet", "-b", "topic"});
-        repository_.git({"rm", "--quiet", "--force", "module"});
-        repository_.write("a first", "x");
-        replace();
-        repository_.commitAll("on topic");
-        repository_.git({"checkout", "--quiet", "main"});
+        makeBranch("topic", runsGit({"rm", "--quiet", "--force", "module"}) +
+                                writes("a first", "x") + replace);
     }
     /// Makes a repository with one commit, without an entry in .gitmodules.
-    void embed(const std::string &name) const
+    static Change embeds(const std::string &name)
     {
-        auto embedded = GitRepository::init(repository_ / name);
-        embedded.write("own", "x");
-        embedded.commitAll("embedded");
+        return [name](const GitRepository &copy)
+        {
+            auto embedded = GitRepository::init(copy / name);
+            embedded.write("own", "x");
+            embedded.commitAll("embedded");
+        };
     }
     void populate() const
     {
@@ -67,7 +64,7 @@ class SubmoduleObstacles : public vclink::test::ObstacleFixture
         branches().switchBranch(name);
         EXPECT_EQ(currentBranch(), "refs/heads/" + name);
     }
-    void expectRefused(const Failure &failure, const std::string &branch) const
+    void expectBothRefused(const Failure &failure, const std::string &branch) const
     {
         expectSwitchRefused(failure, branch);
         expectNothingChanges([&] { EXPECT_EQ(failureOfMerge(branch), textOf(failure)); });
@@ -126,16 +123,14 @@ TEST_F(SubmoduleObstacles, AreFilesAndLinksWhereASubmoduleComes)
     makeAdding();
     repository_.write(".git/info/exclude", "/module\n");
     repository_.write("module", "mine\n");
-    expectRefused(inTheWay("untracked file 'module'"), "with");
+    expectBothRefused(inTheWay("untracked file 'module'"), "with");
     repository_.remove("module");
     repository_.symlink("d", "module");
-    expectRefused(inTheWay("symbolic link 'module'"), "with");
+    expectBothRefused(inTheWay("symbolic link 'module'"), "with");
     repository_.remove("module");
     makeFifo(repository_ / "module");
-    expectRefused(inTheWay("FIFO, socket or device 'module'"), "with");
-    repository_.remove("module");
-    repository_.write("ours", "x");
-    repository_.commitAll("on main");
+    expectBothRefused(inTheWay("FIFO, socket or device 'module'"), "with");
+    repository_.commitAll(removes("module") + writes("ours", "x"), "on main");
     repository_.write("module", "mine\n");
     expectNothingChanges(
         [this] { EXPECT_EQ(failureOfMerge("with"), textOf(inTheWay("untracked file 'module'"))); });
@@ -143,18 +138,11 @@ TEST_F(SubmoduleObstacles, AreFilesAndLinksWhereASubmoduleComes)
 
 TEST_F(SubmoduleObstacles, AreFoldersInThePlaceOfAFileThatBecomesASubmodule)
 {
-    makeBranch("topic",
-               [this]
-               {
-                   repository_.write("a first", "x");
-                   repository_.remove("other");
-                   auto inner = GitRepository::init(repository_ / "other");
-                   inner.commitAll("inner");
-               });
+    makeBranch("topic", writes("a first", "x") + removes("other") + embeds("other"));
     repository_.git({"checkout", "--quiet", "--force", "main"});
     repository_.remove("other");
     repository_.write("other/precious", "mine\n");
-    expectRefused(inTheWay("folder 'other'"), "topic");
+    expectBothRefused(inTheWay("folder 'other'"), "topic");
     repository_.remove("other");
     // A file that is only missing is in nobody's way.
     switchTo("topic");
@@ -163,19 +151,14 @@ TEST_F(SubmoduleObstacles, AreFoldersInThePlaceOfAFileThatBecomesASubmodule)
 
 TEST_F(SubmoduleObstacles, AreMissingFoldersThatBecomeASubmodule)
 {
-    makeBranch("topic",
-               [this]
-               {
-                   repository_.git({"rm", "-r", "--quiet", "d"});
-                   auto inner = GitRepository::init(repository_ / "d");
-                   inner.commitAll("inner");
-               });
+    makeBranch("topic", runsGit({"rm", "-r", "--quiet", "d"}) + embeds("d"));
     ASSERT_EQ(repository_.line({"cat-file", "-t", "main:d"}), "tree");
     ASSERT_NE(repository_.line({"ls-tree", "topic", "d"}).find("commit"), std::string::npos);
     repository_.remove("d");
-    expectRefused(refusal("the folder 'd', which becomes a submodule, is missing: bring it back "
-                          "with 'git restore --source=HEAD --staged --worktree' first"),
-                  "topic");
+    expectBothRefused(
+        refusal("the folder 'd', which becomes a submodule, is missing: bring it back "
+                "with 'git restore --source=HEAD --staged --worktree' first"),
+        "topic");
 }
 
 TEST_F(SubmoduleObstacles, AreStagedFilesInAFolderThatBecomesASubmodule)
@@ -183,12 +166,12 @@ TEST_F(SubmoduleObstacles, AreStagedFilesInAFolderThatBecomesASubmodule)
     makeAdding();
     repository_.write("module/staged", "mine\n");
     repository_.add({"module/staged"});
-    expectRefused(staged("module/staged"), "with");
+    expectBothRefused(staged("module/staged"), "with");
 }
 
 TEST_F(SubmoduleObstacles, AreNotMissingSubmodulesThatBecomeAFile)
 {
-    makeReplacing([this] { repository_.write("module", "theirs\n"); });
+    makeReplacing(writes("module", "theirs\n"));
     repository_.remove("module");
     switchTo("topic");
     EXPECT_EQ(repository_.read("module"), "theirs\n");
@@ -197,7 +180,7 @@ TEST_F(SubmoduleObstacles, AreNotMissingSubmodulesThatBecomeAFile)
 
 TEST_F(SubmoduleObstacles, AreNotMissingSubmodulesThatBecomeAFolder)
 {
-    makeReplacing([this] { repository_.write("module/a", "theirs\n"); });
+    makeReplacing(writes("module/a", "theirs\n"));
     repository_.remove("module");
     switchTo("topic");
     EXPECT_EQ(repository_.read("module/a"), "theirs\n");
@@ -206,18 +189,17 @@ TEST_F(SubmoduleObstacles, AreNotMissingSubmodulesThatBecomeAFolder)
 
 TEST_F(SubmoduleObstacles, AreSubmodulesWithFilesThatBecomeAFolder)
 {
-    makeReplacing([this] { repository_.write("module/a", "theirs\n"); });
+    makeReplacing(writes("module/a", "theirs\n"));
     populate();
-    expectRefused(inTheWay("folder 'module'"), "topic");
+    expectBothRefused(inTheWay("folder 'module'"), "topic");
 }
 
 /// libgit2 takes the submodule for gone then, and its folder for a new one.
 TEST_F(SubmoduleObstacles, OfAMergeAreNotFoldersThatOursHasMadeOfASubmodule)
 {
-    makeReplacing([this] { repository_.write("module", "theirs\n"); });
+    makeReplacing(writes("module", "theirs\n"));
     repository_.git({"rm", "--quiet", "--force", "module"});
-    repository_.write("module/inside", "ours\n");
-    repository_.commitAll("a folder");
+    repository_.commitAll(writes("module/inside", "ours\n"), "a folder");
     expectConflicts("topic");
     EXPECT_EQ(repository_.read("module/inside"), "ours\n");
     EXPECT_EQ(repository_.git({"show", ":module/inside"}), "ours\n");
@@ -226,16 +208,13 @@ TEST_F(SubmoduleObstacles, OfAMergeAreNotFoldersThatOursHasMadeOfASubmodule)
 
 TEST_F(SubmoduleObstacles, OfAMergeAreFoldersBehindASiblingThatSortsBeforeThem)
 {
-    repository_.write("module-1", "x");
-    repository_.commitAll("a name that sorts before the folder's");
-    makeReplacing([] {});
+    repository_.commitAll(writes("module-1", "x"), "a name that sorts before the folder's");
+    makeReplacing(changesNothing);
     populate();
-    repository_.write("ours", "x");
-    repository_.commitAll("on main");
+    repository_.commitAll(writes("ours", "x"), "on main");
     repository_.write("module/mine", "mine\n");
     expectMergeRefused(inTheWay("folder 'module'"));
-    repository_.remove("module-1");
-    repository_.commitAll("without it");
+    repository_.commitAll(removes("module-1"), "without it");
     merge("topic");
     EXPECT_EQ(parents().size(), 2U);
     EXPECT_EQ(repository_.read("module/mine"), "mine\n");
@@ -243,31 +222,27 @@ TEST_F(SubmoduleObstacles, OfAMergeAreFoldersBehindASiblingThatSortsBeforeThem)
 
 TEST_F(SubmoduleObstacles, OfAMergeAreFoldersThatBecomeAFileBehindASibling)
 {
-    repository_.write("module-1", "x");
-    repository_.commitAll("a name that sorts before the folder's");
-    makeReplacing([this] { repository_.write("module", "theirs\n"); });
+    repository_.commitAll(writes("module-1", "x"), "a name that sorts before the folder's");
+    makeReplacing(writes("module", "theirs\n"));
     repository_.git({"submodule", "--quiet", "deinit", "--force", "module"});
-    repository_.write("ours", "x");
-    repository_.commitAll("on main");
+    repository_.commitAll(writes("ours", "x"), "on main");
     expectMergeRefused(inTheWay("folder 'module'"));
 }
 
 /// The other side has something else in the place, which the merge base may have as a file.
 TEST_F(SubmoduleObstacles, OfAMergeAreFoldersThatOnlyWeHaveBehindASibling)
 {
-    repository_.write("module-1", "x");
-    repository_.commitAll("a name that sorts before the folder's");
+    repository_.commitAll(writes("module-1", "x"), "a name that sorts before the folder's");
     for (const bool hasFileBefore : {false, true})
     {
         SCOPED_TRACE(hasFileBefore);
         if (hasFileBefore)
             repository_.write("module", "a file\n");
         repository_.commitAll("before");
-        makeBranch("topic", writing("module", "theirs\n"));
+        makeBranch("topic", writes("module", "theirs\n"));
         if (hasFileBefore)
             repository_.remove("module");
-        embed("module");
-        repository_.commitAll("on main");
+        repository_.commitAll(embeds("module"), "on main");
         repository_.write("module/mine", "mine\n");
         expectMergeRefused(inTheWay("folder 'module'"));
         repository_.git({"branch", "--quiet", "-D", "topic"});
@@ -277,14 +252,9 @@ TEST_F(SubmoduleObstacles, OfAMergeAreFoldersThatOnlyWeHaveBehindASibling)
 
 TEST_F(SubmoduleObstacles, InConflictKeepTheirFolderIfTheyCannotBeMixed)
 {
-    repository_.write(".gitattributes", "* -merge\n");
-    repository_.commitAll("attributes");
-    diverge([this] { embed("module"); },
-            [this]
-            {
-                repository_.write("module", "theirs\n");
-                repository_.write("module-1", "a name that sorts before the folder's");
-            });
+    repository_.commitAll(writes(".gitattributes", "* -merge\n"), "attributes");
+    diverge(embeds("module"), writes("module", "theirs\n") +
+                                  writes("module-1", "a name that sorts before the folder's"));
     repository_.write("module/mine", "mine\n");
     expectConflicts("topic");
     EXPECT_EQ(repository_.read("module/mine"), "mine\n");
@@ -294,18 +264,13 @@ TEST_F(SubmoduleObstacles, InConflictKeepTheirFolderIfTheyCannotBeMixed)
 
 TEST_F(SubmoduleObstacles, AreModulesFilesThatCannotBeRead)
 {
-    makeBranch("topic",
-               [this]
-               {
-                   repository_.write("a first", "x");
-                   embed("module");
-               });
+    makeBranch("topic", writes("a first", "x") + embeds("module"));
     repository_.remove("module");
     repository_.write(".gitmodules", "broken [\n");
     const Failure failure{GIT_ERROR, GIT_ERROR_CONFIG,
                           "failed to parse config file: invalid configuration key (in " +
                               (repository_ / ".gitmodules").string() + ":1)"};
-    expectRefused(failure, "topic");
+    expectBothRefused(failure, "topic");
     repository_.write("ours", "x");
     repository_.add({"ours"});
     repository_.git({"commit", "--quiet", "-m", "ours"});
@@ -317,7 +282,7 @@ TEST_F(SubmoduleObstacles, AreModulesFilesThatCannotBeRead)
 
 TEST_F(SubmoduleObstacles, AreFilesThatAreStagedInThePlaceOfASubmodule)
 {
-    makeReplacing([] {});
+    makeReplacing(changesNothing);
     repository_.git({"rm", "--quiet", "--cached", "module"});
     repository_.remove("module");
     repository_.write("module", "mine\n");
@@ -335,9 +300,9 @@ TEST_F(SubmoduleObstacles, AreStagedCommitsOfASubmodule)
     GitRepository module(module_);
     module.commitAll("more");
     repository_.add({"module"});
-    expectRefused(staged("module"), "topic");
+    expectBothRefused(staged("module"), "topic");
     repository_.git({"rm", "--quiet", "--cached", "module"});
-    expectRefused(staged("module"), "topic");
+    expectBothRefused(staged("module"), "topic");
 }
 
 /// A host's options factory may ask for force: libgit2 would delete the folders then.

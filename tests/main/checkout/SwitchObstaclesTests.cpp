@@ -1,8 +1,9 @@
 // SPDX-License-Identifier: MIT
 #include <filesystem>
-#include <functional>
 #include <memory>
+#include <ostream>
 #include <string>
+#include <vector>
 
 #include <git2/errors.h>
 #include <gmock/gmock.h>
@@ -21,81 +22,103 @@ namespace fs = std::filesystem;
 namespace git = vclink::git;
 using testing::ElementsAre;
 using testing::IsEmpty;
-using vclink::test::Failure;
-using vclink::test::failureOf;
-using vclink::test::GitRepository;
-using vclink::test::makeFifo;
-using vclink::test::makeSocket;
-using vclink::test::RepositoryState;
-using vclink::test::stateOf;
 using vclink::util::exception::CancelledOperationException;
+using namespace vclink::test;
 
 /// A switch and a fast-forward beside what the user has not committed.
-class SwitchObstacles : public vclink::test::ObstacleFixture
+class SwitchObstacles : public ObstacleFixture
 {
   protected:
     /// "topic" is one commit ahead. What goes before it in path order changes as well, so that a
     /// refusal in the midst of the writing shows.
-    void makeTopic(const std::function<void()> &change)
+    void makeTopic(const Change &change)
     {
-        makeBranch("topic",
-                   [&]
-                   {
-                       repository_.write("a first", "x");
-                       change();
-                   });
+        makeBranch("topic", writes("a first", "x") + change);
     }
     /// Expects that the switch and the fast-forward are refused.
-    void expectRefused(const Failure &failure) const
+    void expectRefused(const Failure &failure) const override
     {
         expectSwitchRefused(failure);
         expectMergeRefused(failure);
     }
-    void expectSwitches() const
-    {
-        branches().switchBranch("topic");
-        EXPECT_EQ(currentBranch(), "refs/heads/topic");
-    }
-    /// Makes a folder of the file "other".
-    std::function<void()> folderOfOther()
-    {
-        return [this]
-        {
-            repository_.remove("other");
-            repository_.write("other/a", "x");
-        };
-    }
 };
 
-TEST_F(SwitchObstacles, AreFifosAndSockets)
+/// What a switch and a fast-forward refuse.
+struct RefusedSwitch
 {
-    makeTopic(
-        [this]
-        {
-            repository_.write("d/f", "theirs\n");
-            repository_.remove("d/g");
-            repository_.write("d/new", "x");
-            repository_.write("n/a", "x");
-        });
-    for (const std::string name : {"d/f", "d/g", "d/new", "n"})
-    {
-        fs::remove(repository_ / name);
-        makeFifo(repository_ / name);
-        expectRefused(inTheWay("FIFO, socket or device '" + name + "'"));
-        repository_.remove(name);
-        repository_.git({"reset", "--quiet", "--hard"});
-    }
-    repository_.remove("d");
-    makeSocket(repository_ / "d");
-    expectRefused(inTheWay("FIFO, socket or device 'd'"));
-    repository_.remove("d");
-    repository_.git({"reset", "--quiet", "--hard"});
-    expectSwitches();
+    std::string name;
+    Change branch;
+    std::vector<Obstacle> obstacles;
+    /// a name that sorts before that of a folder, in both commits
+    std::string sibling = "file-1";
+};
+
+std::ostream &operator<<(std::ostream &stream, const RefusedSwitch &refused)
+{
+    return stream << refused.name;
 }
+
+class RefusedSwitches : public SwitchObstacles, public testing::WithParamInterface<RefusedSwitch>
+{
+};
+
+TEST_P(RefusedSwitches, ChangeNothingAndGoWellWithoutTheObstacle)
+{
+    repository_.commitAll(writes(GetParam().sibling, "x"), "sibling");
+    makeTopic(GetParam().branch);
+    expectEachRefused(GetParam().obstacles);
+    expectSwitches();
+    EXPECT_THAT(status(), IsEmpty());
+}
+
+Failure missing(const std::string &what)
+{
+    return refusal("the " + what +
+                   ", is missing: bring it back with 'git restore --source=HEAD "
+                   "--staged --worktree' first");
+}
+
+const std::vector<RefusedSwitch> refusedSwitches{
+    {"AreOfFifosAndSockets",
+     writesEach({"d/f", "d/new", "n/a"}, "theirs\n") + removes("d/g"),
+     {{removes("d/f") + makesFifo("d/f"), inTheWay("FIFO, socket or device 'd/f'")},
+      {removes("d/g") + makesFifo("d/g"), inTheWay("FIFO, socket or device 'd/g'")},
+      {makesFifo("d/new"), inTheWay("FIFO, socket or device 'd/new'")},
+      {makesFifo("n"), inTheWay("FIFO, socket or device 'n'")},
+      {removes("d") + makesSocket("d"), inTheWay("FIFO, socket or device 'd'")}}},
+    {"AreOfFoldersInThePlaceOfAFileThatIsDeleted",
+     removes("other"),
+     {{removes("other") + writes("other/mine", "mine\n"), inTheWay("folder 'other'")}},
+     "other-1"},
+    // libgit2 fails in the midst of its writing where the file is missing. git does without it.
+    {"AreOfFoldersAndNothingInThePlaceOfAFileThatBecomesAFolder",
+     removes("other") + writes("other/a", "x"),
+     {{removes("other") + writes("other/mine", "mine\n"), inTheWay("folder 'other'")},
+      {removes("other"), missing("file 'other', which becomes a folder")}}},
+    // libgit2 moves on without the file where the folder is missing. git does without the folder.
+    {"AreOfAFolderThatBecomesAFileAndIsMissingOrHoldsMore",
+     removes("d") + writes("d", "x"),
+     {{removes("d"), missing("folder 'd', which becomes a file")},
+      {writes("d/n/mine", "mine\n"), inChangedFolder("folder 'd/n'")},
+      {ignores("*.o") + writes("d/mine.o", "mine\n"), inChangedFolder("file 'd/mine.o'")},
+      {writes("d/staged", "mine\n") + runsGit({"add", "d/staged"}),
+       inChangedFolder("file 'd/staged'")},
+      {makesFifo("d/pipe"), inChangedFolder("FIFO, socket or device 'd/pipe'")}}},
+    // libgit2's walk is past "n" when it comes to "n/new".
+    {"AreOfFilesThatLibGit2IsPast",
+     writes("n-b", "theirs\n") + writes("n/new", "x"),
+     {{writes("n", "mine\n"), inTheWay("untracked file 'n'")}},
+     "n-b"},
+    {"AreOfFilesInThePlaceOfATrackedFolder",
+     writes("d/new", "x"),
+     {{removes("d") + writes("d", "mine\n"), inTheWay("untracked file 'd'")}}}};
+
+INSTANTIATE_TEST_SUITE_P(Obstacles, RefusedSwitches, testing::ValuesIn(refusedSwitches),
+                         testing::PrintToStringParamName());
 
 TEST_F(SwitchObstacles, AreNotFifosThatTheBranchDoesNotTouch)
 {
-    makeTopic(writing("d/f", "theirs\n"));
+    makeTopic(writes("d/f", "theirs\n"));
     repository_.remove("other");
     makeFifo(repository_ / "other");
     makeFifo(repository_ / "d/pipe");
@@ -104,57 +127,12 @@ TEST_F(SwitchObstacles, AreNotFifosThatTheBranchDoesNotTouch)
     EXPECT_TRUE(fs::is_fifo(repository_ / "d/pipe"));
 }
 
-TEST_F(SwitchObstacles, AreFoldersInThePlaceOfAFileThatIsDeleted)
-{
-    repository_.write("other-1", "x");
-    repository_.commitAll("a name that sorts before the folder's");
-    makeTopic([this] { repository_.remove("other"); });
-    repository_.remove("other");
-    repository_.write("other/mine", "mine\n");
-    expectRefused(inTheWay("folder 'other'"));
-    EXPECT_FALSE(makeTwin().tryGit({"switch", "topic"}).succeeded());
-    repository_.remove("other");
-    expectSwitches();
-}
-
-TEST_F(SwitchObstacles, AreFoldersInThePlaceOfAFileThatBecomesAFolder)
-{
-    makeTopic(folderOfOther());
-    repository_.remove("other");
-    repository_.write("other/mine", "mine\n");
-    expectRefused(inTheWay("folder 'other'"));
-    EXPECT_FALSE(makeTwin().tryGit({"switch", "topic"}).succeeded());
-    repository_.remove("other");
-    repository_.git({"reset", "--quiet", "--hard"});
-    expectSwitches();
-}
-
-/// libgit2 fails in the midst of its writing. git does without the file.
-TEST_F(SwitchObstacles, AreMissingFilesThatBecomeAFolder)
-{
-    makeTopic(folderOfOther());
-    repository_.remove("other");
-    expectRefused(
-        refusal("the file 'other', which becomes a folder, is missing: bring it back with 'git "
-                "restore --source=HEAD --staged --worktree' first"));
-    repository_.git({"restore", "--source=HEAD", "--staged", "--worktree", "other"});
-    expectSwitches();
-}
-
-/// libgit2 moves on without the file. git does without the folder.
 /// libgit2 would pass them by, and the next commit would undo the branch's change.
 TEST_F(SwitchObstacles, AreMissingFilesThatBecomeALinkAndMissingLinksThatBecomeAFile)
 {
-    repository_.symlink("file", "link");
-    repository_.commitAll("a link");
-    makeTopic(
-        [this]
-        {
-            repository_.remove("other");
-            repository_.symlink("file", "other");
-            repository_.remove("link");
-            repository_.write("link", "a file\n");
-        });
+    repository_.commitAll(links("file", "link"), "a link");
+    makeTopic(removes("other") + links("file", "other") + removes("link") +
+              writes("link", "a file\n"));
     const std::string restore = ", is missing: bring it back with 'git restore "
                                 "--ignore-skip-worktree-bits --source=HEAD --staged --worktree' "
                                 "first";
@@ -173,60 +151,13 @@ TEST_F(SwitchObstacles, AreMissingFilesThatBecomeALinkAndMissingLinksThatBecomeA
     expectSwitches();
 }
 
-TEST_F(SwitchObstacles, AreMissingFoldersThatBecomeAFile)
-{
-    makeTopic(
-        [this]
-        {
-            repository_.remove("d");
-            repository_.write("d", "x");
-        });
-    repository_.remove("d");
-    expectRefused(refusal("the folder 'd', which becomes a file, is missing: bring it back with "
-                          "'git restore --source=HEAD --staged --worktree' first"));
-    repository_.git({"restore", "--source=HEAD", "--staged", "--worktree", "d"});
-    expectSwitches();
-    EXPECT_EQ(repository_.read("d"), "x");
-}
-
-TEST_F(SwitchObstacles, AreThingsInAFolderThatBecomesAFile)
-{
-    makeTopic(
-        [this]
-        {
-            repository_.remove("d");
-            repository_.write("d", "x");
-        });
-    repository_.write("d/n/mine", "mine\n");
-    expectRefused(inChangedFolder("folder 'd/n'"));
-    repository_.remove("d/n");
-    repository_.write(".git/info/exclude", "*.o\n");
-    repository_.write("d/mine.o", "mine\n");
-    expectRefused(inChangedFolder("file 'd/mine.o'"));
-    repository_.remove("d/mine.o");
-    repository_.write("d/staged", "mine\n");
-    repository_.add({"d/staged"});
-    expectRefused(inChangedFolder("file 'd/staged'"));
-    repository_.git({"rm", "--quiet", "--force", "d/staged"});
-    makeFifo(repository_ / "d/pipe");
-    expectRefused(inChangedFolder("FIFO, socket or device 'd/pipe'"));
-    repository_.remove("d/pipe");
-    expectSwitches();
-}
-
-/// libgit2's walk is past "n" when it comes to "n/new".
 TEST_F(SwitchObstacles, AreFoldersThatMayNotBeWrittenTo)
 {
-    makeTopic(
-        [this]
-        {
-            repository_.remove("d/f");
-            repository_.write("d/new/a", "x");
-        });
+    makeTopic(removes("d/f") + writes("d/new/a", "x"));
     fs::permissions(repository_ / "d", fs::perms(0555));
     const RepositoryState before = stateOf(repository_);
-    vclink::test::giveToUnprivilegedUser(folder().path());
-    const std::string text = vclink::test::runAsUnprivilegedUser(
+    giveToUnprivilegedUser(folder().path());
+    const std::string text = runAsUnprivilegedUser(
         [&]
         {
             return failureOf([&] { branches().switchBranch("topic"); }).text + '\n' +
@@ -238,43 +169,9 @@ TEST_F(SwitchObstacles, AreFoldersThatMayNotBeWrittenTo)
     EXPECT_EQ(stateOf(repository_), before);
 }
 
-TEST_F(SwitchObstacles, AreFilesThatLibGit2IsPast)
-{
-    repository_.write("n-b", "x");
-    repository_.commitAll("neighbour");
-    makeTopic(
-        [this]
-        {
-            repository_.write("n-b", "theirs\n");
-            repository_.write("n/new", "x");
-        });
-    repository_.write("n", "mine\n");
-    expectRefused(inTheWay("untracked file 'n'"));
-    repository_.remove("n");
-    repository_.makeFolder("n");
-    expectSwitches();
-}
-
-TEST_F(SwitchObstacles, AreFilesInThePlaceOfATrackedFolder)
-{
-    makeTopic(writing("d/new", "x"));
-    repository_.remove("d");
-    repository_.write("d", "mine\n");
-    expectRefused(inTheWay("untracked file 'd'"));
-    repository_.remove("d");
-    repository_.git({"reset", "--quiet", "--hard"});
-    expectSwitches();
-}
-
 TEST_F(SwitchObstacles, AreStagedChangesThatTheFileDoesNotShow)
 {
-    makeTopic(
-        [this]
-        {
-            repository_.write("d/f", "theirs\n");
-            repository_.remove("d/g");
-            repository_.write("new", "theirs\n");
-        });
+    makeTopic(writes("d/f", "theirs\n") + removes("d/g") + writes("new", "theirs\n"));
     for (const std::string name : {"d/f", "d/g", "new"})
     {
         SCOPED_TRACE(name);
@@ -292,12 +189,7 @@ TEST_F(SwitchObstacles, AreStagedChangesThatTheFileDoesNotShow)
 
 TEST_F(SwitchObstacles, AreStagedDeletionsOfFilesThatTheBranchHasOrThatAreStillThere)
 {
-    makeTopic(
-        [this]
-        {
-            repository_.write("other", "theirs\n");
-            repository_.remove("d/f");
-        });
+    makeTopic(writes("other", "theirs\n") + removes("d/f"));
     for (const std::string name : {"other", "d/f"})
     {
         SCOPED_TRACE(name);
@@ -316,7 +208,7 @@ TEST_F(SwitchObstacles, AreStagedDeletionsOfFilesThatTheBranchHasOrThatAreStillT
 
 TEST_F(SwitchObstacles, AreNotStagedChangesThatTheBranchHasAsWell)
 {
-    makeTopic(writing("d/f", "theirs\n"));
+    makeTopic(writes("d/f", "theirs\n"));
     repository_.write("d/f", "theirs\n");
     repository_.add({"d/f"});
     repository_.write("d/f", "f\n");
@@ -329,7 +221,7 @@ TEST_F(SwitchObstacles, AreNotStagedChangesThatTheBranchHasAsWell)
 /// Without an index everything is untracked.
 TEST_F(SwitchObstacles, AreFilesOfAWorkingCopyThatWasNeverCheckedOut)
 {
-    makeTopic(writing("d/f", "theirs\n"));
+    makeTopic(writes("d/f", "theirs\n"));
     repository_.remove(".git/index");
     repository_.write("other", "mine\n");
     EXPECT_EQ(failureOf([this] { branches().switchBranch("topic"); }).code, GIT_ECONFLICT);
@@ -340,13 +232,8 @@ TEST_F(SwitchObstacles, AreFilesOfAWorkingCopyThatWasNeverCheckedOut)
 TEST_F(SwitchObstacles, AreSubmodulesThatBecomeAFile)
 {
     addModule();
-    makeTopic(
-        [this]
-        {
-            repository_.git({"rm", "--quiet", "--cached", "module"});
-            repository_.remove("module");
-            repository_.write("module", "theirs\n");
-        });
+    makeTopic(runsGit({"rm", "--quiet", "--cached", "module"}) + removes("module") +
+              writes("module", "theirs\n"));
     repository_.git({"submodule", "--quiet", "update", "--init"});
     repository_.write("module/mine", "mine\n");
     expectRefused(inTheWay("folder 'module'"));
@@ -354,12 +241,7 @@ TEST_F(SwitchObstacles, AreSubmodulesThatBecomeAFile)
 
 TEST_F(SwitchObstacles, AreNotUntrackedFilesBesideThoseOfTheBranch)
 {
-    makeTopic(
-        [this]
-        {
-            repository_.write("n/a", "x");
-            repository_.remove("d/f");
-        });
+    makeTopic(writes("n/a", "x") + removes("d/f"));
     repository_.write("n/mine", "mine\n");
     repository_.write("d/mine", "mine\n");
     expectSwitches();
@@ -368,21 +250,17 @@ TEST_F(SwitchObstacles, AreNotUntrackedFilesBesideThoseOfTheBranch)
 
 TEST_F(SwitchObstacles, AreNotEmptyFolders)
 {
-    makeTopic(
-        [this]
-        {
-            repository_.write("new", "x");
-            repository_.write("n/a", "x");
-        });
-    repository_.makeFolder("new");
-    repository_.makeFolder("n");
+    repository_.commitAll(writes("n-b", "x"), "a name that sorts before the folder's");
+    makeTopic(writesEach({"m/a", "n-b", "n/a", "new"}, "theirs\n"));
+    for (const auto *name : {"m", "n", "new"})
+        repository_.makeFolder(name);
     expectSwitches();
     EXPECT_THAT(status(), IsEmpty());
 }
 
 TEST_F(SwitchObstacles, ComeAfterACancellation)
 {
-    makeTopic(writing("n/a", "x"));
+    makeTopic(writes("n/a", "x"));
     repository_.write("n", "mine\n");
     interactor_->cancel();
     expectNothingChanges(
@@ -393,13 +271,13 @@ TEST_F(SwitchObstacles, ComeAfterACancellation)
 /// A host's options factory may ask for force, which is what staged changes give way to.
 TEST_F(SwitchObstacles, OfAForcedSwitchAreNotStagedChanges)
 {
-    makeTopic(writing("d/f", "theirs\n"));
+    makeTopic(writes("d/f", "theirs\n"));
     repository_.write("d/f", "staged\n");
     repository_.add({"d/f"});
     repository_.write("d/f", "mine\n");
-    const auto factory = std::make_shared<vclink::test::TestOptionsFactory>(interactor_);
+    const auto factory = std::make_shared<TestOptionsFactory>(interactor_);
     factory->checkoutOptions.checkoutStrategy = GIT_CHECKOUT_FORCE;
-    git::GitAdapter adapter(vclink::test::asPath(repository_.path()), factory);
+    git::GitAdapter adapter(asPath(repository_.path()), factory);
     git::BranchManager::create(adapter)->switchBranch("topic");
     EXPECT_EQ(repository_.read("d/f"), "theirs\n");
     EXPECT_THAT(status(), IsEmpty());
@@ -408,11 +286,11 @@ TEST_F(SwitchObstacles, OfAForcedSwitchAreNotStagedChanges)
 /// Whatever the host's factory gives.
 TEST_F(SwitchObstacles, OfAFastForwardDoNotDependOnTheFactory)
 {
-    makeTopic(writing("n/a", "x"));
+    makeTopic(writes("n/a", "x"));
     repository_.write("untracked", "mine\n");
-    const auto factory = std::make_shared<vclink::test::TestOptionsFactory>(interactor_);
+    const auto factory = std::make_shared<TestOptionsFactory>(interactor_);
     factory->checkoutOptions.checkoutStrategy = GIT_CHECKOUT_FORCE | GIT_CHECKOUT_REMOVE_UNTRACKED;
-    git::GitAdapter adapter(vclink::test::asPath(repository_.path()), factory);
+    git::GitAdapter adapter(asPath(repository_.path()), factory);
     git::BranchManager::create(adapter)->merge("topic");
     EXPECT_EQ(repository_.read("untracked"), "mine\n");
     EXPECT_EQ(repository_.read("n/a"), "x");

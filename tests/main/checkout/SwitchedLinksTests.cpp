@@ -16,13 +16,11 @@ namespace
 namespace fs = std::filesystem;
 using testing::HasSubstr;
 using testing::IsEmpty;
-using vclink::test::Failure;
-using vclink::test::NothingChanges;
-using vclink::test::stateOf;
+using namespace vclink::test;
 
 /// "main" with the folder "dir", of which the test makes a link to a folder outside that holds the
 /// same names, and branches that change it.
-class SwitchedLinks : public vclink::test::SwitchBranchFixture
+class SwitchedLinks : public SwitchBranchFixture
 {
   protected:
     SwitchedLinks()
@@ -33,25 +31,17 @@ class SwitchedLinks : public vclink::test::SwitchBranchFixture
             repository_.write(std::string("../outside/") + name, "precious\n");
         }
         repository_.commitAll("second");
-        makeBranch("adds", [this] { repository_.write("dir/new", "x"); });
-        makeBranch("edits", [this] { repository_.write("dir/b", "of the branch\n"); });
-        makeBranch("edits-the-first", [this] { repository_.write("dir/a", "of the branch\n"); });
-        makeBranch("drops", [this] { repository_.remove("dir/b"); });
-        makeBranch("drops-all", [this] { repository_.remove("dir"); });
-        makeBranch("elsewhere", [this] { repository_.write("new", "x"); });
+        makeBranch("adds", writes("dir/new", "x"));
+        makeBranch("edits", writes("dir/b", "of the branch\n"));
+        makeBranch("edits-the-first", writes("dir/a", "of the branch\n"));
+        makeBranch("drops", removes("dir/b"));
+        makeBranch("drops-all", removes("dir"));
+        makeBranch("elsewhere", writes("new", "x"));
     }
 
-    template <class Change> void makeBranch(const std::string &name, Change change)
-    {
-        repository_.git({"checkout", "--quiet", "-b", name, "main"});
-        change();
-        repository_.commitAll(name);
-        repository_.git({"checkout", "--quiet", "main"});
-    }
     void linkFolder()
     {
-        repository_.remove("dir");
-        repository_.symlink("../outside/dir", "dir");
+        linksFolder_(repository_);
     }
     static Failure inTheWay(const std::string &name)
     {
@@ -64,6 +54,8 @@ class SwitchedLinks : public vclink::test::SwitchBranchFixture
             EXPECT_EQ(repository_.read(std::string("../outside/") + name), "precious\n");
         EXPECT_FALSE(fs::exists(folder() / "outside/dir/new"));
     }
+
+    const Change linksFolder_ = removes("dir") + links("../outside/dir", "dir");
 };
 
 TEST_F(SwitchedLinks, RefusesToGoThroughALinkThatStandsForAFolder)
@@ -88,7 +80,7 @@ TEST_F(SwitchedLinks, RefusesALinkThatLeadsToAnotherFolderOfTheWorkingCopy)
 
 TEST_F(SwitchedLinks, RefusesALinkThatIsDeeperDown)
 {
-    makeBranch("deep", [this] { repository_.write("dir/deep/new", "x"); });
+    makeBranch("deep", writes("dir/deep/new", "x"));
     repository_.remove("dir/deep");
     repository_.symlink("../../outside/dir/deep", "dir/deep");
     expectRefused("deep", inTheWay("dir/deep"));
@@ -97,7 +89,7 @@ TEST_F(SwitchedLinks, RefusesALinkThatIsDeeperDown)
 
 TEST_F(SwitchedLinks, RefusesALinkFarAboveThatLeadsToNothingOfThatName)
 {
-    makeBranch("deep", [this] { repository_.write("dir/deep/new", "x"); });
+    makeBranch("deep", writes("dir/deep/new", "x"));
     fs::create_directory(folder() / "empty");
     repository_.remove("dir");
     repository_.symlink("../empty", "dir");
@@ -108,11 +100,9 @@ TEST_F(SwitchedLinks, RefusesALinkFarAboveThatLeadsToNothingOfThatName)
 /// libgit2 is past the link with the first of these, and sees no conflict in the second.
 TEST_F(SwitchedLinks, RefusesALinkThatLibGit2IsPast)
 {
-    repository_.write("dir-b", "x");
-    repository_.write("new-b", "x");
-    repository_.commitAll("third");
-    makeBranch("makes", [this] { repository_.write("new/file", "x"); });
-    makeBranch("takes", [this] { repository_.remove("dir"); });
+    repository_.commitAll(writes("dir-b", "x") + writes("new-b", "x"), "third");
+    makeBranch("makes", writes("new/file", "x"));
+    makeBranch("takes", removes("dir"));
     repository_.symlink("../outside", "new");
     expectRefused("makes", inTheWay("new"));
     EXPECT_FALSE(fs::exists(folder() / "outside/file"));
@@ -142,7 +132,7 @@ TEST_F(SwitchedLinks, RefusesALinkThatIsIgnored)
 
 TEST_F(SwitchedLinks, LetsAnIgnoredLinkGiveWayToALinkOfTheBranch)
 {
-    makeBranch("links", [this] { repository_.symlink("same", "new"); });
+    makeBranch("links", links("same", "new"));
     repository_.write(".git/info/exclude", "new\n");
     repository_.symlink("../outside/dir/a", "new");
     const auto expected = stateAfterGit("links");
@@ -181,13 +171,8 @@ TEST_F(SwitchedLinks, IsNoObstacleAboveFilesThatStayAsTheyAre)
 
 TEST_F(SwitchedLinks, IsNoObstacleWhereTheLinkItselfIsTracked)
 {
-    makeBranch("link", [this] { linkFolder(); });
-    makeBranch("file",
-               [this]
-               {
-                   repository_.remove("dir");
-                   repository_.write("dir", "x");
-               });
+    makeBranch("link", linksFolder_);
+    makeBranch("file", removes("dir") + writes("dir", "x"));
     for (const auto *branch : {"link", "main", "link", "file", "link", "adds"})
     {
         SCOPED_TRACE(branch);

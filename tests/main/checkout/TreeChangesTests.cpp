@@ -19,10 +19,10 @@ namespace
 namespace git = vclink::git;
 using testing::ElementsAre;
 using testing::IsEmpty;
-using vclink::test::splitLines;
+using namespace vclink::test;
 
 /// What two trees differ in, compared with `git diff-tree`.
-class TreeChanges : public vclink::test::BranchFixture
+class TreeChanges : public BranchFixture
 {
   protected:
     TreeChanges()
@@ -44,7 +44,7 @@ class TreeChanges : public vclink::test::BranchFixture
     }
     std::vector<std::string> byLibrary(const std::string &before, const std::string &after) const
     {
-        const auto repository = git::openRepository(vclink::test::asPath(repository_.path()));
+        const auto repository = git::openRepository(asPath(repository_.path()));
         const auto left = treeOf(repository.get(), before);
         const auto right = treeOf(repository.get(), after);
         std::vector<std::string> lines;
@@ -100,9 +100,7 @@ TEST_F(TreeChanges, AreFilesAddedChangedAndRemovedAtEveryDepth)
 TEST_F(TreeChanges, AreModesAndKinds)
 {
     repository_.setMode("tool", 0755);
-    repository_.remove("z");
-    repository_.symlink("a", "z");
-    repository_.commitAll("second");
+    repository_.commitAll(removes("z") + links("a", "z"), "second");
     expectAsGit("HEAD~1", "HEAD");
     EXPECT_THAT(byLibrary("HEAD~1", "HEAD"), ElementsAre("M tool", "M z"));
 }
@@ -137,7 +135,7 @@ TEST_F(TreeChanges, FromAndToNothingAreEveryFile)
 
 TEST_F(TreeChanges, EndWhenTheVisitorHasSeenEnough)
 {
-    const auto repository = git::openRepository(vclink::test::asPath(repository_.path()));
+    const auto repository = git::openRepository(asPath(repository_.path()));
     const auto tree = git::lookupTree(
         repository.get(),
         git_object_id(git::revparseObject(repository.get(), "HEAD^{tree}").value().get()));

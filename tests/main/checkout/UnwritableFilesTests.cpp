@@ -23,30 +23,16 @@ namespace
 
 namespace fs = std::filesystem;
 using testing::HasSubstr;
-using vclink::test::asPath;
-using vclink::test::failureOf;
-using vclink::test::giveToUnprivilegedUser;
-using vclink::test::runAsUnprivilegedUser;
+using namespace vclink::test;
 
 /// Tracked files that libgit2 cannot open for writing, between others that it writes. git makes
 /// them anew.
-class UnwritableFiles : public vclink::test::ObstacleFixture
+class UnwritableFiles : public ObstacleFixture
 {
   protected:
     UnwritableFiles()
     {
-        for (const auto *name : {"a", "d/r", "z"})
-            repository_.write(name, "old\n");
-        repository_.commitAll("files");
-    }
-    /// What changes all of them, and adds a file.
-    std::function<void()> changingAll() const
-    {
-        return [this]
-        {
-            for (const auto *name : {"a", "d/r", "n", "z"})
-                repository_.write(name, "theirs\n");
-        };
+        repository_.commitAll(writesEach({"a", "d/r", "z"}, "old\n"), "files");
     }
     /// What `action` comes to as the user of the working copy, who may not write to "d/r".
     std::string unprivileged(const std::function<void()> &action) const
@@ -84,11 +70,20 @@ class UnwritableFiles : public vclink::test::ObstacleFixture
         ASSERT_EQ(::stat((repository_ / name).c_str(), &status), 0);
         EXPECT_EQ(status.st_mode & ALLPERMS, mode);
     }
+    /// What the switch to "topic" throws for a user who may not write to the folder "d".
+    std::string switchByAnother() const
+    {
+        return runAsUnprivilegedUser(
+            [this] { return failureOf([this] { branches().switchBranch("topic"); }).text; });
+    }
+
+    /// Changes all of them, and adds a file.
+    const Change changesAll_ = writesEach({"a", "d/r", "n", "z"}, "theirs\n");
 };
 
 TEST_F(UnwritableFiles, AreMadeAnewByASwitch)
 {
-    makeBranch("topic", changingAll());
+    makeBranch("topic", changesAll_);
     EXPECT_EQ(unprivileged([this] { branches().switchBranch("topic"); }), "");
     expectAll("theirs\n");
     expectMode("d/r", 0644);
@@ -97,7 +92,7 @@ TEST_F(UnwritableFiles, AreMadeAnewByASwitch)
 
 TEST_F(UnwritableFiles, AreMadeAnewByAFastForward)
 {
-    makeBranch("topic", changingAll());
+    makeBranch("topic", changesAll_);
     EXPECT_EQ(unprivileged([this] { merge("topic"); }), "");
     expectAll("theirs\n");
     EXPECT_EQ(idOf("HEAD"), idOf("topic"));
@@ -105,7 +100,7 @@ TEST_F(UnwritableFiles, AreMadeAnewByAFastForward)
 
 TEST_F(UnwritableFiles, AreMadeAnewByAMerge)
 {
-    diverge(writing("ours", "x"), changingAll());
+    diverge(writes("ours", "x"), changesAll_);
     EXPECT_EQ(unprivileged([this] { merge("topic"); }), "");
     expectAll("theirs\n");
     EXPECT_EQ(parents().size(), 2U);
@@ -113,20 +108,9 @@ TEST_F(UnwritableFiles, AreMadeAnewByAMerge)
 
 TEST_F(UnwritableFiles, InConflictAreMadeAnewByAMerge)
 {
-    repository_.write(".gitattributes", "z -merge\n");
-    repository_.commitAll("attributes");
-    diverge(
-        [this]
-        {
-            for (const auto *name : {"a", "d/r", "z"})
-                repository_.write(name, "ours\n");
-        },
-        [this]
-        {
-            repository_.write("a", "theirs\n");
-            repository_.write("z", "theirs\n");
-            repository_.remove("d/r");
-        });
+    repository_.commitAll(writes(".gitattributes", "z -merge\n"), "attributes");
+    diverge(writesEach({"a", "d/r", "z"}, "ours\n"),
+            writes("a", "theirs\n") + writes("z", "theirs\n") + removes("d/r"));
     const std::string text = unprivileged(
         [this]
         {
@@ -160,7 +144,7 @@ TEST_F(UnwritableFiles, KeepThePermissionToExecute)
 {
     repository_.setMode("d/r", 0755);
     repository_.commitAll("program");
-    makeBranch("topic", changingAll());
+    makeBranch("topic", changesAll_);
     const std::string text = unprivileged(
         [this]
         {
@@ -173,7 +157,7 @@ TEST_F(UnwritableFiles, KeepThePermissionToExecute)
 
 TEST_F(UnwritableFiles, ThatAreEditedAreLeftIfTheCheckoutIsRefused)
 {
-    makeBranch("topic", changingAll());
+    makeBranch("topic", changesAll_);
     repository_.write("d/r", "mine\n");
     EXPECT_NE(unprivileged([this] { branches().switchBranch("topic"); }), "");
     EXPECT_EQ(repository_.read("d/r"), "mine\n");
@@ -183,12 +167,11 @@ TEST_F(UnwritableFiles, ThatAreEditedAreLeftIfTheCheckoutIsRefused)
 
 TEST_F(UnwritableFiles, InAFolderThatCannotBeWrittenToAreRefused)
 {
-    makeBranch("topic", changingAll());
+    makeBranch("topic", changesAll_);
     giveToUnprivilegedUser(folder().path());
     repository_.setMode("d/r", 0444);
     repository_.setMode("d", 0555);
-    const std::string text = runAsUnprivilegedUser(
-        [this] { return failureOf([this] { branches().switchBranch("topic"); }).text; });
+    const std::string text = switchByAnother();
     repository_.setMode("d", 0755);
     EXPECT_EQ(text, "the file 'd/r' cannot be written to, and its folder cannot be written to");
     expectAll("old\n");
@@ -198,16 +181,10 @@ TEST_F(UnwritableFiles, InAFolderThatCannotBeWrittenToAreRefused)
 /// libgit2 makes such a file anew.
 TEST_F(UnwritableFiles, ThatChangeTheirPermissionsInSuchAFolderAreRefused)
 {
-    makeBranch("topic",
-               [this]
-               {
-                   changingAll()();
-                   repository_.setMode("d/r", 0755);
-               });
+    makeBranch("topic", changesAll_ + makesExecutable("d/r"));
     giveToUnprivilegedUser(folder().path());
     repository_.setMode("d", 0555);
-    const std::string text = runAsUnprivilegedUser(
-        [this] { return failureOf([this] { branches().switchBranch("topic"); }).text; });
+    const std::string text = switchByAnother();
     repository_.setMode("d", 0755);
     EXPECT_EQ(text, "the file 'd/r' changes its permissions, and its folder cannot be written to");
     expectAll("old\n");
@@ -217,33 +194,16 @@ TEST_F(UnwritableFiles, ThatChangeTheirPermissionsInSuchAFolderAreRefused)
 /// libgit2 removes each file in conflict, and makes it anew.
 TEST_F(UnwritableFiles, InConflictInSuchAFolderAreRefused)
 {
-    diverge(
-        [this]
-        {
-            for (const auto *name : {"a", "d/r"})
-                repository_.write(name, "ours\n");
-        },
-        changingAll());
+    diverge(writesEach({"a", "d/r"}, "ours\n"), changesAll_);
     expectMergeRefusedIn("d");
 }
 
 TEST_F(UnwritableFiles, InConflictInSuchAFolderAreRefusedIfTheyAreRenamed)
 {
     const std::string lines = "1\n2\n3\n4\n5\n6\n7\n8\n";
-    repository_.write("b", lines + "old\n");
-    repository_.commitAll("lines");
-    diverge(
-        [this, &lines]
-        {
-            repository_.write("a", "ours\n");
-            repository_.remove("b");
-            repository_.write("e/renamed", lines + "ours\n");
-        },
-        [this, &lines]
-        {
-            repository_.write("a", "theirs\n");
-            repository_.write("b", lines + "theirs\n");
-        });
+    repository_.commitAll(writes("b", lines + "old\n"), "lines");
+    diverge(writes("a", "ours\n") + removes("b") + writes("e/renamed", lines + "ours\n"),
+            writes("a", "theirs\n") + writes("b", lines + "theirs\n"));
     expectMergeRefusedIn("e");
 }
 
@@ -254,7 +214,7 @@ TEST_F(UnwritableFiles, OfOurOwnWhereTheirsIsInConflictAreRefused)
     repository_.write("i", "old\n");
     repository_.git({"add", "--force", "i"});
     repository_.commitAll("ignored");
-    diverge([this] { repository_.remove("i"); }, writing("i", "theirs\n"));
+    diverge(removes("i"), writes("i", "theirs\n"));
     repository_.write("../precious", "precious\n");
     fs::create_hard_link(repository_ / "../precious", repository_ / "i");
     expectMergeRefused(inTheWay("untracked file 'i'"));
@@ -273,7 +233,7 @@ TEST_F(UnwritableFiles, OfOurOwnWhereTheirsIsRenamedToAreRefused)
 {
     repository_.write(".git/info/exclude", "i\n");
     repository_.write("../precious", "precious\n");
-    diverge([this] { repository_.remove("a"); }, moving("a", "i"));
+    diverge(removes("a"), moves("a", "i"));
     fs::create_hard_link(repository_ / "../precious", repository_ / "i");
     expectMergeRefused(inTheWay("untracked file 'i'"));
     EXPECT_EQ(repository_.read("../precious"), "precious\n");
@@ -282,17 +242,16 @@ TEST_F(UnwritableFiles, OfOurOwnWhereTheirsIsRenamedToAreRefused)
 /// Only the owner may remove another user's file from a folder like /tmp.
 TEST_F(UnwritableFiles, OfAnotherUserInAFolderWithTheStickyBitAreRefused)
 {
-    if (!vclink::test::runsAsRoot())
+    if (!runsAsRoot())
     {
         return;
     }
-    makeBranch("topic", changingAll());
+    makeBranch("topic", changesAll_);
     giveToUnprivilegedUser(folder().path());
     ASSERT_EQ(::chown((repository_ / "d").c_str(), 0, 0), 0);
     ASSERT_EQ(::chown((repository_ / "d/r").c_str(), 0, 0), 0);
     repository_.setMode("d", 01777);
-    const std::string text = runAsUnprivilegedUser(
-        [this] { return failureOf([this] { branches().switchBranch("topic"); }).text; });
+    const std::string text = switchByAnother();
     EXPECT_EQ(text, "the file 'd/r' cannot be written to, and its folder cannot be written to");
     EXPECT_EQ(repository_.read("a"), "old\n");
     EXPECT_EQ(repository_.read("d/r"), "old\n");
@@ -306,12 +265,7 @@ class RunningProgram : public UnwritableFiles
     {
         fs::copy_file("/bin/sleep", repository_ / "program");
         repository_.commitAll("program");
-        makeBranch("topic",
-                   [this]
-                   {
-                       changingAll()();
-                       repository_.write("program", "theirs\n");
-                   });
+        makeBranch("topic", changesAll_ + writes("program", "theirs\n"));
         start();
     }
     ~RunningProgram() override

@@ -17,12 +17,9 @@ namespace
 {
 
 namespace git = vclink::git;
-using vclink::test::asPath;
-using vclink::test::giveToUnprivilegedUser;
-using vclink::test::makeFifo;
-using vclink::test::runAsUnprivilegedUser;
+using namespace vclink::test;
 
-class WorkingCopies : public vclink::test::ObstacleFixture
+class WorkingCopies : public ObstacleFixture
 {
   protected:
     std::string blockerOf(const std::string &name) const
@@ -65,7 +62,7 @@ TEST_F(WorkingCopies, FindTheEntriesThatTheIndexHas)
         .input("100644 " + id + " 2\td/in-conflict\n")
         .run();
     const std::string listed = repository_.git({"ls-files"});
-    std::vector<std::string> names = vclink::test::splitLines(listed);
+    std::vector<std::string> names = splitLines(listed);
     names.insert(names.end(), {"", "a", "d", "d/", "d/10a", "d/99", "D/1", "zz"});
     const auto repository = git::openRepository(asPath(repository_.path()));
     const auto index = git::getRepositoryIndex(repository.get());

@@ -59,7 +59,7 @@ class InstalledTools : public MergeFixture, public testing::WithParamInterface<s
     {
         repository_.write(".gitattributes", "file merge=vkAutoMerge\n");
         repository_.commitAll("attributes");
-        diverge(writing("file", oursOfFile), writing("file", theirsOfFile));
+        diverge(writes("file", oursOfFile), writes("file", theirsOfFile));
     }
     /// Puts a note in the place of the launcher, so that a run of it can be seen.
     void replaceAutoMerge(const std::string &script) const
@@ -143,7 +143,7 @@ TEST_P(InstalledTools, ThatAreGoneFailTheMerge)
 
 TEST_P(InstalledTools, ServeGitsMergeTool)
 {
-    diverge(writing("file", ourText), writing("file", theirText));
+    diverge(writes("file", ourText), writes("file", theirText));
     // A conflict that the tool can merge, since only git is told to leave the file alone.
     repository_.write(".git/info/attributes", "file -merge\n");
     EXPECT_FALSE(repository_.tryGit({"merge", "--quiet", "--no-edit", "topic"}).succeeded());
@@ -156,7 +156,7 @@ TEST_P(InstalledTools, ServeGitsMergeTool)
 
 TEST_P(InstalledTools, TellGitsMergeToolWhatTheyCannotMerge)
 {
-    diverge(writing("file", "ours\n"), writing("file", "theirs\n"));
+    diverge(writes("file", "ours\n"), writes("file", "theirs\n"));
     EXPECT_FALSE(repository_.tryGit({"merge", "--quiet", "--no-edit", "topic"}).succeeded());
     const std::string before = repository_.read("file");
     const auto result = repository_.tryGit({"-c", "mergetool.vkMerge.trustExitCode=true",

@@ -48,7 +48,7 @@ class LockedIndex : public MergeFixture
 TEST_F(LockedIndex, MakesEveryOperationFailBeforeItsFirstWrite)
 {
     makeAhead();
-    makeBranch("diverged", writing("file", "theirs\n"), "main");
+    makeBranch("diverged", writes("file", "theirs\n"), "main");
     repository_.write("other", "edited\n");
     repository_.write("untracked", "x");
     repository_.write(".git/index.lock", "of another process");
@@ -120,7 +120,7 @@ TEST_F(LockedIndex, LeavesABranchThatHasMovedSinceItsFastForwardWasDecided)
 TEST_F(LockedIndex, LeavesAMergeThatHasBegunSinceItsOwnOrItsFastForwardWasDecided)
 {
     makeAhead();
-    makeBranch("third", writing("third", "x"), "main");
+    makeBranch("third", writes("third", "x"), "main");
     for (const bool isDiverged : {false, true})
     {
         if (isDiverged)

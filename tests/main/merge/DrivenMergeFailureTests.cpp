@@ -233,11 +233,9 @@ TEST_F(DrivenMergeFailure, OfAnyKindIsToldBeforeTheNextFileIsAskedFor)
 {
     repository_.write(".git/info/attributes", "other merge=second\n");
     repository_.git({"checkout", "--quiet", "topic"});
-    repository_.write("other", "theirs\n");
-    repository_.commitAll("theirs");
+    repository_.commitAll(writes("other", "theirs\n"), "theirs");
     repository_.git({"checkout", "--quiet", "main"});
-    repository_.write("other", "ours\n");
-    repository_.commitAll("ours");
+    repository_.commitAll(writes("other", "ours\n"), "ours");
     const std::string mark = folder() / "mark";
     repository_.git({"config", "merge.second.driver", scripts_.shell("echo run >" + mark)});
     define("/nowhere/tool");

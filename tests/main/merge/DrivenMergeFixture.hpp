@@ -23,7 +23,7 @@ class DrivenMergeFixture : public MergeFixture
         repository_.write(".gitattributes", "file merge=tool\n");
         repository_.write("file", "base\n");
         repository_.commitAll("base");
-        diverge(writing("file", "ours\n"), writing("file", "theirs\n"));
+        diverge(writes("file", "ours\n"), writes("file", "theirs\n"));
     }
 
     void define(const std::string &command) const

@@ -34,14 +34,8 @@ class FastForward : public MergeFixture
   protected:
     FastForward()
     {
-        makeBranch("topic",
-                   [this]
-                   {
-                       repository_.write("file", "of topic\n");
-                       repository_.remove("other");
-                       repository_.write("folder/new", "x");
-                       repository_.write("same", "x");
-                   });
+        makeBranch("topic", writes("file", "of topic\n") + removes("other") +
+                                writes("folder/new", "x") + writes("same", "x"));
     }
 
     static std::string cancellation()
@@ -74,8 +68,7 @@ TEST_F(FastForward, WritesNoMessageOfItsOwnIntoTheReflog)
 TEST_F(FastForward, KeepsChangesThatItDoesNotTouch)
 {
     repository_.git({"checkout", "--quiet", "topic"});
-    repository_.write("more", "x");
-    repository_.commitAll("more");
+    repository_.commitAll(writes("more", "x"), "more");
     repository_.git({"checkout", "--quiet", "topic~1"});
     repository_.write("same", "mine\n");
     repository_.write("untracked", "mine\n");

@@ -122,8 +122,7 @@ class KilledMerge : public InterruptedMerge, public testing::WithParamInterface<
         for (const auto *name : {"deleted", "untouched", "sub/tracked", "becomes a file/a",
                                  "becomes a file/b", "becomes a folder"})
             repository_.write(name, "x");
-        repository_.write(".gitignore", "*.ignored\n");
-        repository_.commitAll("more");
+        repository_.commitAll(writes(".gitignore", "*.ignored\n"), "more");
         diverge(writes("both", "ours\n2\n3\n4\n5\n6\n7\n") + moves("renamed", "of another name"),
                 writes("both", "1\n2\n3\n4\n5\n6\ntheirs\n") + removes("deleted") +
                     writes("renamed", "one line\nand another\nand a third\nof theirs\n") +
@@ -192,7 +191,7 @@ INSTANTIATE_TEST_SUITE_P(AtCall, KilledMerge, testing::Values(1U, 2U, 3U, 4U, 6U
 
 TEST_F(InterruptedMerge, OfConflictsOnlyIsNotConcludedByACommit)
 {
-    diverge(writing("file", "ours\n"), writing("file", "theirs\n"));
+    diverge(writes("file", "ours\n"), writes("file", "theirs\n"));
     killMergeAt(1);
     expectRefused();
     run(wayOut());
@@ -221,7 +220,7 @@ TEST_F(InterruptedMerge, IsNotToldByTheMarkerOfAnother)
 TEST_F(InterruptedMerge, IsNotConcludedOnAnotherBranchEither)
 {
     makeDiverged();
-    makeBranch("third", writing("third", "x"), "main^");
+    makeBranch("third", writes("third", "x"), "main^");
     killMergeAt(2);
     repository_.git({"symbolic-ref", "HEAD", "refs/heads/third"});
     repository_.git({"reset", "--quiet", "--", "."});
@@ -233,7 +232,7 @@ TEST_F(InterruptedMerge, IsNotConcludedOnAnotherBranchEither)
 
 TEST_F(InterruptedMerge, IsOverOnceGitHasAbortedIt)
 {
-    diverge(writing("file", "ours\n"), writing("file", "theirs\n"));
+    diverge(writes("file", "ours\n"), writes("file", "theirs\n"));
     killMergeAt(1);
     repository_.git({"merge", "--abort"});
     repository_.tryGit({"merge", "topic"});
@@ -244,8 +243,8 @@ TEST_F(InterruptedMerge, IsOverOnceGitHasAbortedIt)
 
 TEST_F(InterruptedMerge, IsNotHiddenByWhatGitLeftOfAnEarlierOne)
 {
-    diverge(writing("file", "ours\n"), writing("theirs", "x"));
-    makeBranch("before", writing("earlier", "x"), "main^");
+    diverge(writes("file", "ours\n"), writes("theirs", "x"));
+    makeBranch("before", writes("earlier", "x"), "main^");
     repository_.git({"merge", "--quiet", "--no-commit", "before"});
     ASSERT_TRUE(exists(".git/AUTO_MERGE"));
     commit();
@@ -256,7 +255,7 @@ TEST_F(InterruptedMerge, IsNotHiddenByWhatGitLeftOfAnEarlierOne)
 /// git leaves it behind a cherry-pick that it refuses.
 TEST_F(InterruptedMerge, LeavesWhatGitLeftIfItIsRefused)
 {
-    diverge(writing("file", "ours\n"), writing("theirs", "x"));
+    diverge(writes("file", "ours\n"), writes("theirs", "x"));
     const std::string tree = repository_.git({"rev-parse", "main^{tree}"});
     repository_.write(".git/AUTO_MERGE", tree);
     repository_.write("other", "edited\n");
@@ -269,7 +268,7 @@ TEST_F(InterruptedMerge, LeavesWhatGitLeftIfItIsRefused)
 
 TEST_F(InterruptedMerge, OfNoDifferenceLacksNothing)
 {
-    diverge(writing("file", "same\n"), writing("file", "same\n"));
+    diverge(writes("file", "same\n"), writes("file", "same\n"));
     killMergeAt(1);
     expectConcluded();
 }
@@ -285,7 +284,7 @@ TEST_F(InterruptedMerge, LeavesAMarkerThatTheNextCommitRemoves)
 TEST_F(InterruptedMerge, IsNoneThatHasEnded)
 {
     makeDiverged();
-    makeBranch("cancelled", writing("other", "theirs\n"), "main^");
+    makeBranch("cancelled", writes("other", "theirs\n"), "main^");
     repository_.write(mergeMarker, markerOf("main", "topic"));
     merge("topic");
     EXPECT_FALSE(exists(mergeMarker));
@@ -313,9 +312,8 @@ TEST_F(InterruptedMerge, StandsInItsMarkerWhileFilesAreWritten)
     EXPECT_GT(calls, 0U);
     EXPECT_FALSE(exists(mergeMarker));
     interactor_->progress.onCall = nullptr;
-    makeBranch("conflict", writing("file", "theirs\n"));
-    repository_.write("file", "ours\n");
-    repository_.commitAll("ours");
+    makeBranch("conflict", writes("file", "theirs\n"));
+    repository_.commitAll(writes("file", "ours\n"), "ours");
     expectConflicts("conflict");
     EXPECT_FALSE(exists(mergeMarker));
     EXPECT_FALSE(exists(indexLock));
@@ -335,8 +333,7 @@ TEST_F(InterruptedMerge, ByAnotherProgramHasNothingInCommon)
 {
     repository_.git({"checkout", "--quiet", "--orphan", "topic"});
     repository_.git({"rm", "--quiet", "-rf", "."});
-    repository_.write("theirs", "x");
-    repository_.commitAll("theirs");
+    repository_.commitAll(writes("theirs", "x"), "theirs");
     repository_.git({"checkout", "--quiet", "main"});
     beginMergeAsLibGit2();
     expectRefusedForItsIndex();
@@ -361,8 +358,7 @@ TEST_F(InterruptedMerge, IsNoneOfThese)
         repository_.git({"reset", "--quiet", "--hard", ours});
     }
     repository_.git({"checkout", "--quiet", "-B", "topic", "main^"});
-    repository_.write("file", "theirs\n");
-    repository_.commitAll("in conflict only");
+    repository_.commitAll(writes("file", "theirs\n"), "in conflict only");
     repository_.git({"checkout", "--quiet", "main"});
     beginMergeAsLibGit2();
     expectConcluded();
@@ -371,10 +367,7 @@ TEST_F(InterruptedMerge, IsNoneOfThese)
 /// Their new file is the other half of a conflict.
 TEST_F(InterruptedMerge, IsNoneOfARenameThatIsResolvedToOurs)
 {
-    diverge(removes("file"),
-            [](const GitRepository &repository) {
-                repository.git({"mv", "file", "renamed"});
-            });
+    diverge(removes("file"), moves("file", "renamed"));
     expectConflicts("topic");
     repository_.remove("renamed");
     for (const auto *name : {"file", "renamed"})
@@ -401,7 +394,7 @@ TEST_F(InterruptedMerge, IsNoneOfATypeThatChangesWhereOursIsRenamed)
 TEST_F(InterruptedMerge, IsNoneOfSeveralHeads)
 {
     makeDiverged();
-    makeBranch("third", writing("third", "x"), "main^");
+    makeBranch("third", writes("third", "x"), "main^");
     beginMergeAsLibGit2();
     repository_.write(".git/MERGE_HEAD", idOf("topic") + "\n" + idOf("third") + "\n");
     commit();

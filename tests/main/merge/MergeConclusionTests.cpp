@@ -37,8 +37,7 @@ class MergeConclusion : public CommitFixture
     {
         for (const auto &branch : branches)
             makeBranch(branch);
-        repository_.write("ours", "x");
-        repository_.commitAll("ours");
+        repository_.commitAll(writes("ours", "x"), "ours");
         std::vector<std::string> arguments{"merge", "--quiet", "--no-commit"};
         arguments.insert(arguments.end(), branches.begin(), branches.end());
         repository_.git(arguments);
@@ -159,11 +158,9 @@ TEST_F(MergeConclusion, DropsAConflictWhereNoFileOrAFolderStands)
 TEST_F(MergeConclusion, TakesTheirFileThatWeDeletedWhereItStands)
 {
     repository_.git({"branch", "theirs"});
-    repository_.remove("file");
-    repository_.commitAll("ours");
+    repository_.commitAll(removes("file"), "ours");
     repository_.git({"checkout", "--quiet", "theirs"});
-    repository_.write("file", "theirs\n");
-    repository_.commitAll("theirs");
+    repository_.commitAll(writes("file", "theirs\n"), "theirs");
     repository_.git({"checkout", "--quiet", "main"});
     EXPECT_FALSE(repository_.tryGit({"merge", "--quiet", "theirs"}).succeeded());
     ASSERT_EQ(linesOf(repository_.git({"ls-files", "--unmerged"})).size(), 2U);

@@ -20,9 +20,9 @@ class MergeConflictsResolved : public MergeFixture
   protected:
     MergeConflictsResolved()
     {
-        repository_.write(".gitattributes", "binary -merge\n");
-        repository_.write("binary", "ancestor\n");
-        repository_.commitAll("attributes");
+        repository_.commitAll(writes(".gitattributes", "binary -merge\n") +
+                                  writes("binary", "ancestor\n"),
+                              "attributes");
         diverge(writes("file", "ours\n") + writes("binary", "ours\n") + removes("other"),
                 writes("file", "theirs\n") + writes("binary", "theirs\n") +
                     writes("other", "theirs\n") + writes("new", "x"));
@@ -53,7 +53,7 @@ TEST_F(MergeConflictsResolved, AreCommittedWithBothParentsAndLetTheNextMergeBegi
               ".gitattributes\nbinary\nfile\nnew\n");
     EXPECT_EQ(repository_.git({"cat-file", "blob", "HEAD:file"}), "both\n");
     EXPECT_EQ(repository_.git({"fsck", "--strict", "--no-dangling"}), "");
-    makeBranch("second", [this] { repository_.write("second", "x"); });
+    makeBranch("second", writes("second", "x"));
     EXPECT_NO_THROW(merge("second"));
     EXPECT_NO_THROW(merge("topic")) << "up to date";
 }

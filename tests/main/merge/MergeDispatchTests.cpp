@@ -141,7 +141,7 @@ TEST_F(MergeDispatch, AnUnbornBranchIsRefusedWhateverIsPreferred)
 TEST_F(MergeDispatch, ADetachedHeadMovesAlone)
 {
     makeAhead();
-    makeBranch("other", [this] { repository_.write("ours", "x"); });
+    makeBranch("other", writes("ours", "x"));
     repository_.git({"checkout", "--quiet", "--detach"});
     const std::string main = idOf("main");
     expectAsGit();
@@ -182,7 +182,7 @@ TEST_F(MergeDispatch, RefusesAnAnnotatedTagOrAFileByItsRightId)
 TEST_F(MergeDispatch, TakesTheTagWhereABranchHasTheSameNameAsGitDoes)
 {
     makeDiverged();
-    makeBranch("third", [this] { repository_.write("third", "x"); });
+    makeBranch("third", writes("third", "x"));
     repository_.git({"tag", "topic", "third"});
     expectAsGit();
     EXPECT_TRUE(std::filesystem::exists(repository_ / "third"));
@@ -194,8 +194,7 @@ TEST_F(MergeDispatch, MergesHistoriesThatHaveNothingInCommon)
 {
     repository_.git({"checkout", "--quiet", "--orphan", "topic"});
     repository_.git({"rm", "-r", "--quiet", "--force", "."});
-    repository_.write("theirs", "x");
-    repository_.commitAll("theirs");
+    repository_.commitAll(writes("theirs", "x"), "theirs");
     repository_.git({"checkout", "--quiet", "main"});
     EXPECT_FALSE(makeTwin().tryGit({"merge", "--quiet", "--no-edit", "topic"}).succeeded());
     const std::string ours = idOf("main");
@@ -223,9 +222,8 @@ TEST_F(MergeDispatch, WorksInALinkedWorktree)
 TEST_F(MergeDispatch, OneAfterAnotherWorks)
 {
     makeDiverged();
-    makeBranch("second", [this] { repository_.write("second", "x"); });
-    makeBranch(
-        "third", [this] { repository_.write("third", "x"); }, "main~1");
+    makeBranch("second", writes("second", "x"));
+    makeBranch("third", writes("third", "x"), "main~1");
     EXPECT_NO_THROW(merge("topic"));
     EXPECT_NO_THROW(merge("second"));
     EXPECT_NO_THROW(merge("third"));

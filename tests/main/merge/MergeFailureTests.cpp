@@ -126,7 +126,7 @@ TEST_F(MergeFailure, OfAnOperationUnderWayTellsSoAndTouchesNothing)
 
 TEST_F(MergeFailure, OfConflictsUnderWayTouchesNothing)
 {
-    diverge(writing("file", "ours\n"), writing("file", "theirs\n"));
+    diverge(writes("file", "ours\n"), writes("file", "theirs\n"));
     expectConflicts("topic");
     expectRefusedForItsState({"topic", "main"});
 }

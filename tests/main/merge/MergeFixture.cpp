@@ -118,46 +118,20 @@ void MergeFixture::expectConflicts(const std::string &name) const
     EXPECT_EQ(branches().getRepositoryState(), "Conflicts");
 }
 
-void MergeFixture::makeBranch(const std::string &name, const std::function<void()> &change,
-                              const std::string &start)
-{
-    repository_.git({"checkout", "--quiet", "-b", name, start});
-    change();
-    repository_.commitAll("on " + name);
-    repository_.git({"checkout", "--quiet", "main"});
-}
-
-std::function<void()> MergeFixture::writing(const std::string &name, const std::string &bytes) const
-{
-    return [=] { repository_.write(name, bytes); };
-}
-
-std::function<void()> MergeFixture::moving(const std::string &from, const std::string &to) const
-{
-    return [=] { repository_.git({"mv", from, to}); };
-}
-
-void MergeFixture::diverge(const std::function<void()> &ours, const std::function<void()> &theirs)
-{
-    makeBranch("topic", theirs);
-    ours();
-    repository_.commitAll("on main");
-}
-
 void MergeFixture::diverge(const Change &ours, const Change &theirs)
 {
-    diverge([&] { ours(repository_); }, [&] { theirs(repository_); });
+    makeBranch("topic", theirs);
+    repository_.commitAll(ours, "on main");
 }
 
 void MergeFixture::makeAhead()
 {
-    makeBranch("topic", [this] { repository_.write("new", "x"); });
+    makeBranch("topic", writes("new", "x"));
 }
 
 void MergeFixture::makeDiverged()
 {
-    diverge([this] { repository_.write("ours", "x"); },
-            [this] { repository_.write("theirs", "x"); });
+    diverge(writes("ours", "x"), writes("theirs", "x"));
 }
 
 void MergeFixture::prefer(const std::string &value) const
@@ -165,17 +139,14 @@ void MergeFixture::prefer(const std::string &value) const
     repository_.git({"config", "merge.ff", value});
 }
 
-void MergeFixture::crissCross(const std::function<void()> &ours,
-                              const std::function<void()> &theirs)
+void MergeFixture::crissCross(const Change &ours, const Change &theirs)
 {
     const std::string first = idOf("main");
     repository_.git({"merge", "--quiet", "--no-edit", "topic"});
-    ours();
-    repository_.commitAll("on main again");
+    repository_.commitAll(ours, "on main again");
     repository_.git({"checkout", "--quiet", "topic"});
     repository_.git({"merge", "--quiet", "--no-edit", first});
-    theirs();
-    repository_.commitAll("on topic again");
+    repository_.commitAll(theirs, "on topic again");
     repository_.git({"checkout", "--quiet", "main"});
     ASSERT_EQ(splitLines(repository_.git({"merge-base", "--all", "main", "topic"})).size(), 2U);
 }

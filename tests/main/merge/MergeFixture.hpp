@@ -1,13 +1,11 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
-#include <functional>
 #include <iosfwd>
 #include <string>
 #include <vector>
 
 #include "main/branches/BranchFixture.hpp"
-#include "support/Change.hpp"
 
 namespace vclink::test
 {
@@ -46,15 +44,7 @@ class MergeFixture : public BranchFixture
     /// failureOfMerge(), expecting the text of HasConflicts.
     void expectConflicts(const std::string &name) const;
 
-    /// Makes the branch at `start`, has `change` done there, commits it and comes back to main.
-    void makeBranch(const std::string &name, const std::function<void()> &change,
-                    const std::string &start = "main");
-    /// What writes a whole file of the working copy.
-    std::function<void()> writing(const std::string &name, const std::string &bytes) const;
-    /// What gives a file of the working copy another name.
-    std::function<void()> moving(const std::string &from, const std::string &to) const;
     /// Has `ours` committed on main and `theirs` on the new branch "topic".
-    void diverge(const std::function<void()> &ours, const std::function<void()> &theirs);
     void diverge(const Change &ours, const Change &theirs);
     /// Makes the branch "topic" with a commit that main does not have, of the file "new".
     void makeAhead();
@@ -62,7 +52,7 @@ class MergeFixture : public BranchFixture
     void makeDiverged();
     /// After diverge(): has each branch merge what the other has so far, so that there are two
     /// merge bases, and commit one more change.
-    void crissCross(const std::function<void()> &ours, const std::function<void()> &theirs);
+    void crissCross(const Change &ours, const Change &theirs);
     /// Has the submodule "module" committed.
     /// @return the repository that it is cloned from, with one commit
     GitRepository addModule();

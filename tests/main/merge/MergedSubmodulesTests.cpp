@@ -36,27 +36,19 @@ class MergedSubmodules : public MergeFixture
     /// Checks a commit out in the submodule.
     void go(const std::string &id) const
     {
-        module_.git({"checkout", "--quiet", id});
+        checksOut(id)(repository_);
     }
-    std::function<void()> moving(const std::string &id) const
+    static Change checksOut(const std::string &id)
     {
-        return [this, id] { go(id); };
-    }
-    std::function<void()> removing() const
-    {
-        return [this] { repository_.git({"rm", "--quiet", "--cached", "module", ".gitmodules"}); };
+        return [id](const GitRepository &copy) {
+            GitRepository(copy / "module").git({"checkout", "--quiet", id});
+        };
     }
     /// "topic" moves the submodule to the second commit. Ours stays at the first, which is also
     /// checked out, and has another change.
-    void theyMove(const std::function<void()> &ours)
+    void theyMove(const Change &ours)
     {
-        diverge(
-            [&]
-            {
-                go(first_);
-                ours();
-            },
-            moving(second_));
+        diverge(checksOut(first_) + ours, checksOut(second_));
     }
     /// The submodule's commit at HEAD; empty when it has none.
     std::string merged() const
@@ -64,29 +56,28 @@ class MergedSubmodules : public MergeFixture
         return repository_.line({"ls-tree", "--format=%(objectname)", "HEAD", "module"});
     }
     /// "topic" takes the submodule out of the index and leaves its folder.
-    void theyRemove(const std::function<void()> &ours, const std::string &file = "theirs")
+    void theyRemove(const Change &ours, const std::string &file = "theirs")
     {
         repository_.git({"checkout", "--quiet", "-b", "topic"});
-        removing()();
+        removes_(repository_);
         repository_.write(file, "theirs\n");
         repository_.add({file});
         repository_.commit("on topic");
         repository_.git({"checkout", "--quiet", "--force", "main"});
-        ours();
-        repository_.commitAll("on main");
+        repository_.commitAll(ours, "on main");
     }
     /// Goes to a branch from before the submodule, whose folder stays.
     void leaveSubmodule()
     {
         repository_.git({"checkout", "--quiet", "-b", "before", idOf("main~1")});
-        writing("ours", "x")();
+        repository_.write("ours", "x");
         repository_.add({"ours"});
         repository_.commit("on before");
     }
     /// Has the submodule removed on main and its folder left.
     void weRemove()
     {
-        removing()();
+        removes_(repository_);
         repository_.commit("on main");
         repository_.write(".git/info/exclude", "/module\n");
     }
@@ -117,6 +108,7 @@ class MergedSubmodules : public MergeFixture
         adapter_->commit(upath(), ustring(u"merged"));
     }
 
+    const Change removes_ = runsGit({"rm", "--quiet", "--cached", "module", ".gitmodules"});
     const GitRepository module_{repository_ / "module"};
     std::string first_;
     std::string second_;
@@ -125,7 +117,7 @@ class MergedSubmodules : public MergeFixture
 
 TEST_F(MergedSubmodules, TakeTheCommitOfTheSideThatMovedThemAndNotWhatIsCheckedOut)
 {
-    theyMove(writing("ours", "x"));
+    theyMove(writes("ours", "x"));
     ASSERT_EQ(idOf("main:module"), first_);
     ASSERT_EQ(idOf("topic:module"), second_);
     const std::string ours = idOf("main");
@@ -145,7 +137,7 @@ TEST_F(MergedSubmodules, TakeTheCommitOfTheSideThatMovedThemAndNotWhatIsCheckedO
 
 TEST_F(MergedSubmodules, KeepTheCommitThatOursMovedThemTo)
 {
-    diverge(moving(third_), writing("theirs", "x"));
+    diverge(checksOut(third_), writes("theirs", "x"));
     go(second_);
     expectAsGitBesideTheFolder();
     EXPECT_EQ(merged(), third_) << "not what is checked out";
@@ -153,22 +145,16 @@ TEST_F(MergedSubmodules, KeepTheCommitThatOursMovedThemTo)
 
 TEST_F(MergedSubmodules, InACommitByHandStayAsMergedUnlessTheUserHasMovedOrRemovedThem)
 {
-    makeBranch("topic",
-               [this]
-               {
-                   go(second_);
-                   repository_.write("file", "theirs\n");
-               });
+    makeBranch("topic", checksOut(second_) + writes("file", "theirs\n"));
     go(first_);
-    repository_.write("file", "ours\n");
-    repository_.commitAll("on main");
-    const std::vector<std::pair<std::function<void()>, std::string>> changes{
-        {[] {}, second_}, {moving(third_), third_}, {[this] { repository_.remove("module"); }, ""}};
+    repository_.commitAll(writes("file", "ours\n"), "on main");
+    const std::vector<std::pair<Change, std::string>> changes{
+        {changesNothing, second_}, {checksOut(third_), third_}, {removes("module"), ""}};
     for (const auto &[change, id] : changes)
     {
         expectConflicts("topic");
         repository_.write("file", "both\n");
-        change();
+        change(repository_);
         commit();
         EXPECT_EQ(merged(), id);
         EXPECT_THAT(parents(), testing::SizeIs(2));
@@ -178,7 +164,7 @@ TEST_F(MergedSubmodules, InACommitByHandStayAsMergedUnlessTheUserHasMovedOrRemov
 
 TEST_F(MergedSubmodules, OfAMergeByGitStayAsMergedInACommit)
 {
-    theyMove(writing("ours", "x"));
+    theyMove(writes("ours", "x"));
     repository_.git({"merge", "--quiet", "--no-commit", "topic"});
     commit();
     EXPECT_EQ(merged(), second_);
@@ -186,12 +172,9 @@ TEST_F(MergedSubmodules, OfAMergeByGitStayAsMergedInACommit)
 
 TEST_F(MergedSubmodules, InConflictAreTakenAsTheyAreCheckedOut)
 {
-    diverge(moving(third_),
-            [this]
-            {
-                go(second_);
-                GitRepository(module_).commitAll("theirs");
-            });
+    diverge(
+        checksOut(third_), checksOut(second_) + [this](const GitRepository &)
+                               { GitRepository(module_).commitAll("theirs"); });
     for (const std::string &id : {third_, first_})
     {
         go(third_);
@@ -207,7 +190,7 @@ TEST_F(MergedSubmodules, InConflictAreTakenAsTheyAreCheckedOut)
 
 TEST_F(MergedSubmodules, InConflictThatAreNotPopulatedStayOurs)
 {
-    diverge(moving(third_), moving(second_));
+    diverge(checksOut(third_), checksOut(second_));
     repository_.git({"submodule", "--quiet", "deinit", "--force", "module"});
     expectConflicts("topic");
     commit();
@@ -217,7 +200,7 @@ TEST_F(MergedSubmodules, InConflictThatAreNotPopulatedStayOurs)
 TEST_F(MergedSubmodules, ThatTheyRemovedLeaveTheIndexAndStayOnDisk)
 {
     module_.write("untracked", "mine\n");
-    theyRemove(writing("ours", "x"));
+    theyRemove(writes("ours", "x"));
     expectAsGitBesideTheFolder();
     EXPECT_EQ(merged(), "");
     EXPECT_EQ(module_.read("untracked"), "mine\n");
@@ -226,7 +209,7 @@ TEST_F(MergedSubmodules, ThatTheyRemovedLeaveTheIndexAndStayOnDisk)
 
 TEST_F(MergedSubmodules, ThatTheyRemovedAreGoneBesideConflictsToo)
 {
-    theyRemove(writing("file", "ours\n"), "file");
+    theyRemove(writes("file", "ours\n"), "file");
     expectAsGitBesideTheFolder();
     EXPECT_THAT(conflicts(), ElementsAre("1 file", "2 file", "3 file"));
     EXPECT_EQ(repository_.line({"ls-files", "module"}), "");
@@ -237,7 +220,7 @@ TEST_F(MergedSubmodules, ThatTheyRemovedAreGoneBesideConflictsToo)
 
 TEST_F(MergedSubmodules, ThatTheyRemovedAndWeMovedAreInConflict)
 {
-    theyRemove(moving(third_));
+    theyRemove(checksOut(third_));
     expectAsGitBesideTheFolder();
     EXPECT_THAT(conflicts(), ElementsAre("1 module", "2 module"));
 }
@@ -245,7 +228,7 @@ TEST_F(MergedSubmodules, ThatTheyRemovedAndWeMovedAreInConflict)
 /// As in a clone of git, where `git rm` has left the folder of a submodule with edits.
 TEST_F(MergedSubmodules, ThatWeRemovedAndTheyMovedAreTakenAsTheyAreCheckedOutOrStayRemoved)
 {
-    makeBranch("topic", moving(second_));
+    makeBranch("topic", checksOut(second_));
     weRemove();
     expectAsGitBesideTheFolder();
     EXPECT_THAT(conflicts(), ElementsAre("1 module", "3 module"));
@@ -265,7 +248,7 @@ TEST_F(MergedSubmodules, ThatWeRemovedAndTheyMovedAreTakenAsTheyAreCheckedOutOrS
 /// git commits nothing then: it has no commit to take.
 TEST_F(MergedSubmodules, ThatWeRemovedAndTheyMovedStayRemovedWithoutARepository)
 {
-    makeBranch("topic", moving(second_));
+    makeBranch("topic", checksOut(second_));
     weRemove();
     expectConflicts("topic");
     repository_.remove("module");
@@ -283,8 +266,7 @@ TEST_F(MergedSubmodules, MayBeAllThatTheyRemoved)
     repository_.git({"rm", "--quiet", "--cached", "module"});
     repository_.commit("on topic");
     repository_.git({"checkout", "--quiet", "--force", "main"});
-    writing("ours", "x")();
-    repository_.commitAll("on main");
+    repository_.commitAll(writes("ours", "x"), "on main");
     expectAsGitBesideTheFolder();
 }
 
@@ -343,7 +325,7 @@ class LateEntriesAdapter : public vclink::git::GitAdapter
 /// libgit2 leaves such an entry where it could not write the file.
 TEST_F(MergedSubmodules, ThatNoParentHasAreNotInAMerge)
 {
-    theyMove(writing("ours", "x"));
+    theyMove(writes("ours", "x"));
     LateEntriesAdapter adapter(
         asPath(repository_.path()),
         std::static_pointer_cast<vclink::ApplicationInteractor>(interactor_));

@@ -34,17 +34,10 @@ class MovedHead : public BranchCallsFixture
     /// "topic" is ahead, with changes of each kind, or diverged.
     void makeTopic(bool isDiverged)
     {
-        makeBranch("topic",
-                   [this]
-                   {
-                       repository_.write("file", "theirs\n");
-                       repository_.remove("other");
-                       repository_.write("theirs", "x");
-                   });
+        makeBranch("topic", writes("file", "theirs\n") + removes("other") + writes("theirs", "x"));
         if (isDiverged)
         {
-            repository_.write("ours", "x");
-            repository_.commitAll("on main");
+            repository_.commitAll(writes("ours", "x"), "on main");
         }
     }
     /// Has a new file staged that only the late commit has.
@@ -171,7 +164,7 @@ TEST_F(MovedHead, RefusesAFastForwardThatHasLookedAtAnotherCommit)
 /// Deletions alone are told of by no notification.
 TEST_F(MovedHead, KeepsWhatWasCommittedSinceTheLookBeforeAFastForward)
 {
-    makeBranch("topic", [this] { repository_.remove("other"); });
+    makeBranch("topic", removes("other"));
     moveHeadBefore<git_checkout_tree>();
     EXPECT_NE(failureOfMerge("topic"), "");
     EXPECT_EQ(idOf("main"), moved_);
@@ -201,10 +194,9 @@ TEST_F(MovedHead, RefusesAMergeBeforeItWrites)
 /// libgit2 has read HEAD by then, to merge it, and reads it again to check and to write.
 TEST_F(MovedHead, RefusesAMergeWhileItsCommandsRun)
 {
-    repository_.write(".gitattributes", "driven merge=slow\n");
-    repository_.write("driven", "base\n");
-    repository_.commitAll("driven");
-    diverge(writing("driven", "ours\n"), writing("driven", "theirs\n"));
+    repository_.commitAll(
+        writes(".gitattributes", "driven merge=slow\n") + writes("driven", "base\n"), "driven");
+    diverge(writes("driven", "ours\n"), writes("driven", "theirs\n"));
     repository_.write("../slow",
                       "cd '" + repository_.path().string() +
                           "' && : >.git/hooks/commit-msg.go\nturn=0\n"
@@ -291,7 +283,7 @@ TEST_F(MovedHead, LeavesAMergeThatAnotherProcessHasTakenBack)
 TEST_F(MovedHead, LeavesAnotherMergeThatAnotherProcessHasBegun)
 {
     makeTopic(true);
-    makeBranch("third", writing("third", "x"), "main^");
+    makeBranch("third", writes("third", "x"), "main^");
     const std::string ours = idOf("main");
     LibGit2Recorder calls;
     beforeTheCommit(calls,

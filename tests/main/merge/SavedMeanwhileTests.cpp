@@ -16,18 +16,17 @@
 namespace
 {
 
-using vclink::test::LibGit2Recorder;
+using namespace vclink::test;
 
-class SavedMeanwhile : public vclink::test::BranchCallsFixture
+class SavedMeanwhile : public BranchCallsFixture
 {
   protected:
     SavedMeanwhile()
     {
         // The time of a file's inode cannot be set.
         repository_.git({"config", "core.trustctime", "false"});
-        makeBranch("topic", [this] { repository_.write("file", "theirs\n"); });
-        repository_.write("ours", "x");
-        repository_.commitAll("on main");
+        makeBranch("topic", writes("file", "theirs\n"));
+        repository_.commitAll(writes("ours", "x"), "on main");
     }
     /// Has the merge's index written some time after the file, as it is where there are many:
     /// libgit2 takes a file of the same moment for changed.

@@ -26,11 +26,9 @@ class StateConclusion : public CommitFixture
     StateConclusion()
     {
         repository_.git({"branch", "theirs"});
-        repository_.write("file", "ours\n");
-        repository_.commitAll("ours");
+        repository_.commitAll(writes("file", "ours\n"), "ours");
         repository_.git({"checkout", "--quiet", "theirs"});
-        repository_.write("file", "theirs\n");
-        repository_.commitAll("theirs");
+        repository_.commitAll(writes("file", "theirs\n"), "theirs");
         repository_.git({"checkout", "--quiet", "main"});
     }
 
@@ -90,8 +88,7 @@ TEST_P(StoppedState, IsEndedByACommit)
     repository_.git({"checkout", "--quiet", "theirs"});
     repository_.commit("theirs, too");
     repository_.git({"checkout", "--quiet", "main"});
-    repository_.write("file", "once more\n");
-    repository_.commitAll("second");
+    repository_.commitAll(writes("file", "once more\n"), "second");
     stopAt(GetParam().arguments);
     expectEnds(GetParam().names);
 }

@@ -41,9 +41,8 @@ class ThreeWayConflicts : public MergeFixture
     }
     void attribute(const std::string &line)
     {
-        repository_.write(".gitattributes", line);
-        repository_.commitAll("attributes");
-        diverge(writing("file", "ours\n"), writing("file", "theirs\n"));
+        repository_.commitAll(writes(".gitattributes", line), "attributes");
+        diverge(writes("file", "ours\n"), writes("file", "theirs\n"));
     }
     /// Expects markers, where git has this.
     void expectMarkersUnlikeGit(const std::string &contentOfGit) const
@@ -126,7 +125,7 @@ INSTANTIATE_TEST_SUITE_P(TheConflicts, ConflictsAsInGit, testing::ValuesIn(confl
 TEST_F(ThreeWayConflicts, LabelTheirMarkersWithTheHeadAndTheId)
 {
     repository_.git({"config", "merge.conflictStyle", "diff3"});
-    diverge(writing("file", "ours\n"), writing("file", "theirs\n"));
+    diverge(writes("file", "ours\n"), writes("file", "theirs\n"));
     expectConflicts("topic");
     EXPECT_EQ(repository_.read("file"), "<<<<<<< HEAD\nours\n||||||| first\n1\n2\n3\n4\n5\n6\n7\n8"
                                         "\n9\n=======\ntheirs\n>>>>>>> " +
@@ -135,8 +134,8 @@ TEST_F(ThreeWayConflicts, LabelTheirMarkersWithTheHeadAndTheId)
 
 TEST_F(ThreeWayConflicts, OfCrissCrossHistoriesAreAsInGit)
 {
-    diverge(writing("other", "ours 1\n"), writing("file", "theirs 1\n"));
-    crissCross(writing("file", "ours 2\n"), writing("file", "theirs 2\n"));
+    diverge(writes("other", "ours 1\n"), writes("file", "theirs 1\n"));
+    crissCross(writes("file", "ours 2\n"), writes("file", "theirs 2\n"));
     expectConflictsAsGit(threeStages);
 }
 

@@ -128,15 +128,15 @@ TEST_F(ThreeWayMerge, OfTheSameRenameWithDifferentChangesIsAConflict)
 TEST_F(ThreeWayMerge, OfCrissCrossHistoriesIsAsInGit)
 {
     makeDiverged();
-    crissCross(writing("file", "ours\n2\n3\n4\n5\n6\n7\n8\n9\n"),
-               writing("file", "1\n2\n3\n4\n5\n6\n7\n8\ntheirs\n"));
+    crissCross(writes("file", "ours\n2\n3\n4\n5\n6\n7\n8\n9\n"),
+               writes("file", "1\n2\n3\n4\n5\n6\n7\n8\ntheirs\n"));
     expectCleanAsGit();
 }
 
 TEST_F(ThreeWayMerge, OfCrissCrossHistoriesCanTakeNothingOfTheirs)
 {
     makeDiverged();
-    const auto change = writing("file", "the same\n");
+    const auto change = writes("file", "the same\n");
     const auto changeWithoutNew = [this, &change]
     {
         change();
@@ -149,12 +149,7 @@ TEST_F(ThreeWayMerge, OfCrissCrossHistoriesCanTakeNothingOfTheirs)
 
 TEST_F(ThreeWayMerge, OfAChangedTypeWhereOursIsRenamedIsCommitted)
 {
-    diverge(moving("file", "renamed"),
-            [this]
-            {
-                repository_.remove("file");
-                repository_.symlink("other", "file");
-            });
+    diverge(moves("file", "renamed"), removes("file") + links("other", "file"));
     EXPECT_NO_THROW(merge("topic"));
     EXPECT_EQ(parents().size(), 2U);
     EXPECT_TRUE(status().empty());
@@ -163,7 +158,7 @@ TEST_F(ThreeWayMerge, OfAChangedTypeWhereOursIsRenamedIsCommitted)
 TEST_F(ThreeWayMerge, WithAnOctopusAmongTheAncestorsIsAsInGitAndOfItsBranchesDoesNothing)
 {
     for (const std::string name : {"one", "two", "three"})
-        makeBranch(name, writing(name, name));
+        makeBranch(name, writes(name, name));
     repository_.git({"merge", "--quiet", "--no-edit", "one", "two", "three"});
     ASSERT_EQ(parents().size(), 3U);
     for (const auto *name : {"one", "two", "three"})

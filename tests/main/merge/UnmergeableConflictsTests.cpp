@@ -50,8 +50,7 @@ class UnmergeableConflicts : public MergeFixture
   protected:
     void attributes(const std::string &lines)
     {
-        repository_.write(".gitattributes", lines);
-        repository_.commitAll("attributes");
+        repository_.commitAll(writes(".gitattributes", lines), "attributes");
     }
     /// Has each file changed on both sides.
     void divergeIn(const std::vector<std::string> &names)
@@ -59,12 +58,14 @@ class UnmergeableConflicts : public MergeFixture
         for (const auto &name : names)
             repository_.write(name, "ancestor\n");
         repository_.commitAll("ancestor");
-        diverge([&] { writeAll(names, "ours"); }, [&] { writeAll(names, "theirs"); });
-    }
-    void writeAll(const std::vector<std::string> &names, const std::string &side) const
-    {
+        Change ours = changesNothing;
+        Change theirs = changesNothing;
         for (const auto &name : names)
-            repository_.write(name, side + " of " + name + '\n');
+        {
+            ours = ours + writes(name, "ours of " + name + '\n');
+            theirs = theirs + writes(name, "theirs of " + name + '\n');
+        }
+        diverge(ours, theirs);
     }
     bool isOurs(const std::string &name) const
     {
@@ -200,7 +201,7 @@ TEST_F(UnmergeableConflicts, OfLinksAreOursAndKeepOurMode)
 TEST_F(UnmergeableConflicts, WithAFolderOfTheirsInTheirPlaceTellThatInPlaceOfTheConflict)
 {
     attributes("new -merge\n");
-    diverge(writing("new", "ours\n"), writing("new/inside", "theirs\n"));
+    diverge(writes("new", "ours\n"), writes("new/inside", "theirs\n"));
     const std::string head = idOf("HEAD");
     EXPECT_THAT(failureOfMerge("topic"), testing::HasSubstr("Is a directory"));
     EXPECT_THAT(conflicts(), ElementsAre("2 new"));

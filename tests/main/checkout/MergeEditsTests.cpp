@@ -1,0 +1,136 @@
+// SPDX-License-Identifier: MIT
+#include <string>
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include "ObstacleFixture.hpp"
+
+namespace
+{
+
+using testing::IsEmpty;
+using namespace vclink::test;
+
+Failure edited(const std::string &name)
+{
+    return refusal("the uncommitted changes of '" + name + "' would be lost in the merge");
+}
+
+Failure hiddenEdit(const std::string &name, const std::string &option)
+{
+    return refusal("the changes of '" + name +
+                   "' would be lost in the merge. Git hides them, because the "
+                   "file is marked " +
+                   option + ": take the mark away with 'git update-index --no-" + option +
+                   "' and commit, or remove the file");
+}
+
+/// A true merge beside edits of tracked files.
+class MergeEdits : public ObstacleFixture
+{
+};
+
+TEST_F(MergeEdits, OfFilesThatItDoesNotTouchAreRefused)
+{
+    theyWrite({"theirs"});
+    expectEachRefused({{writes("other", "mine\n"), edited("other")},
+                       {makesExecutable("d/g"), edited("d/g")},
+                       {links("f", "d/g"), edited("d/g")},
+                       {removes("d") + links("../outside", "d"), edited("d")},
+                       {removes("d") + writes("d", "mine\n"), edited("d")}});
+    expectCleanAsGit();
+}
+
+TEST_F(MergeEdits, AreRefusedWithTheFirstName)
+{
+    theyWrite({"d/new"});
+    expectEachRefused({{writesEach({"other", "file", "d/g"}, "mine\n"), edited("d/g")}});
+    repository_.write("d/new", "mine\n");
+    repository_.git({"update-index", "--skip-worktree", "other"});
+    repository_.write("other", "mine\n");
+    expectMergeRefused(inTheWay("untracked file 'd/new'"));
+}
+
+TEST_F(MergeEdits, AreNotMissingFilesWhichComeBack)
+{
+    theyWrite({"theirs"});
+    repository_.remove("other");
+    repository_.remove("d");
+    merge("topic");
+    EXPECT_THAT(status(), IsEmpty());
+}
+
+TEST_F(MergeEdits, ThatGitHidesAreRefusedWhateverTheyDoToTheFile)
+{
+    const std::string start = idOf("main");
+    for (const std::string option : {"skip-worktree", "assume-unchanged"})
+    {
+        for (const auto &change : {writes("d/g", "theirs\n"), removes("d/g"), writes("d/n", "x")})
+        {
+            diverge(writes("ours", "x"), writes("theirs", "x") + change);
+            repository_.git({"update-index", "--" + option, "d/g"});
+            repository_.write("d/g", "mine\n");
+            expectMergeRefused(hiddenEdit("d/g", option));
+            repository_.git({"update-index", "--no-" + option, "d/g"});
+            repository_.git({"reset", "--quiet", "--hard", start});
+            repository_.git({"branch", "--quiet", "-D", "topic"});
+        }
+    }
+}
+
+TEST_F(MergeEdits, AreNotHiddenFilesThatAreAsCommittedOrMissing)
+{
+    theyWrite({"d/g", "theirs"});
+    repository_.commitAll(links("d", "link"), "link");
+    repository_.git({"update-index", "--skip-worktree", "d/f", "other", "link"});
+    repository_.git({"update-index", "--assume-unchanged", "d/g"});
+    repository_.remove("other");
+    merge("topic");
+    EXPECT_EQ(repository_.read("d/g"), "theirs\n");
+}
+
+TEST_F(MergeEdits, MayBeWhateverIsInThePlaceOfAHiddenFile)
+{
+    theyWrite({"theirs"});
+    repository_.git({"update-index", "--skip-worktree", "d/f"});
+    for (const auto &change :
+         {removes("d/f") + links("f\n", "d/f"), removes("d/f") + makesFifo("d/f"),
+          removes("d/f") + writes("d/f/mine", "mine\n"), removes("d") + links("../outside", "d")})
+    {
+        change(repository_);
+        expectMergeRefused(hiddenEdit("d/f", "skip-worktree"));
+    }
+}
+
+TEST_F(MergeEdits, AreNotChangesInASubmodule)
+{
+    addModule();
+    theyWrite({"theirs"});
+    GitRepository module(repository_ / "module");
+    module.write("untracked", "mine\n");
+    module.commitAll("mine");
+    const std::string id = module.line({"rev-parse", "HEAD"});
+    merge("topic");
+    EXPECT_EQ(module.line({"rev-parse", "HEAD"}), id);
+    EXPECT_EQ(module.read("untracked"), "mine\n");
+}
+
+TEST_F(MergeEdits, AreFilesInThePlaceOfASubmodule)
+{
+    addModule();
+    theyWrite({"theirs"});
+    expectEachRefused({{removes("module") + writes("module", "mine\n"), edited("module")}});
+}
+
+TEST_F(MergeEdits, AreSubmodulesThatBecomeAFile)
+{
+    addModule();
+    diverge(writes("ours", "x"), runsGit({"rm", "--quiet", "--cached", "module"}) +
+                                     removes("module") + writes("module", "theirs\n"));
+    repository_.git({"submodule", "--quiet", "update", "--init"});
+    repository_.write("module/mine", "mine\n");
+    expectMergeRefused(inTheWay("folder 'module'"));
+}
+
+} // namespace
