@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: MIT
 #include "repositories.hpp"
 
+#include "support/Change.hpp"
+
 namespace vclink::test
 {
 namespace
@@ -12,24 +14,15 @@ void configureIdentity(const GitRepository &repository)
     repository.git({"config", "user.email", "person@example.com"});
 }
 
-void change(const GitRepository &repository)
+void diverge(GitRepository &repository, const Change &ours, const Change &theirs)
 {
-    repository.write("file", "changed\n");
-    repository.remove("other");
-    repository.write("staged", "staged\n");
-    repository.add({"staged"});
-    repository.write("new", "new\n");
+    repository.makeBranch("topic", theirs);
+    repository.commitAll(ours, "on main");
 }
 
-/// Both sides change "file".
 void divergeInFile(GitRepository &repository)
 {
-    repository.git({"checkout", "--quiet", "-b", "topic"});
-    repository.write("file", "theirs\n");
-    repository.commitAll("on topic");
-    repository.git({"checkout", "--quiet", "main"});
-    repository.write("file", "ours\n");
-    repository.commitAll("on main");
+    diverge(repository, writes("file", "ours\n"), writes("file", "theirs\n"));
 }
 
 /// Stages a repository of its own.
@@ -53,10 +46,9 @@ void makeConflictUnder(GitRepository &repository, const std::string &attributes)
 void makePlain(GitRepository &repository)
 {
     configureIdentity(repository);
-    repository.write("file", "1\n2\n3\n");
-    repository.write("other", "other\n");
-    repository.write("sub/inside", "inside\n");
-    repository.commitAll("first");
+    repository.commitAll(writes("file", "1\n2\n3\n") + writes("other", "other\n") +
+                             writes("sub/inside", "inside\n"),
+                         "first");
 }
 
 void makeEmpty(GitRepository &repository)
@@ -69,7 +61,11 @@ void makeEmpty(GitRepository &repository)
 void makeChanged(GitRepository &repository)
 {
     makePlain(repository);
-    change(repository);
+    repository.write("file", "changed\n");
+    repository.remove("other");
+    repository.write("staged", "staged\n");
+    repository.add({"staged"});
+    repository.write("new", "new\n");
 }
 
 void makeUnindexed(GitRepository &repository)
@@ -98,8 +94,7 @@ void makeEmptied(GitRepository &repository)
 {
     repository.write(".gitattributes", "* text\n");
     makePlain(repository);
-    repository.write("file", "");
-    repository.write("other", "");
+    writesEach({"file", "other"}, "")(repository);
     repository.write("new", "new\n");
 }
 
@@ -121,11 +116,7 @@ void makeTypeChange(GitRepository &repository)
 void makeBranches(GitRepository &repository)
 {
     makePlain(repository);
-    repository.git({"checkout", "--quiet", "-b", "topic"});
-    repository.write("file", "theirs\n");
-    repository.write("added", "added\n");
-    repository.commitAll("on topic");
-    repository.git({"checkout", "--quiet", "main"});
+    repository.makeBranch("topic", writes("file", "theirs\n") + writes("added", "added\n"));
     repository.git({"update-ref", "refs/remotes/origin/main", "HEAD"});
 }
 
@@ -139,13 +130,8 @@ void makeLinkedFolder(GitRepository &repository)
 void makeReplacedFolder(GitRepository &repository)
 {
     makePlain(repository);
-    repository.write("folder/deep/inside", "x\n");
-    repository.commitAll("deeper");
-    repository.git({"checkout", "--quiet", "-b", "topic"});
-    repository.remove("folder");
-    repository.write("folder", "theirs\n");
-    repository.commitAll("on topic");
-    repository.git({"checkout", "--quiet", "main"});
+    repository.commitAll(writes("folder/deep/inside", "x\n"), "deeper");
+    repository.makeBranch("topic", removes("folder") + writes("folder", "theirs\n"));
 }
 
 void makePromising(GitRepository &repository)
@@ -163,21 +149,14 @@ void makeUpToDate(GitRepository &repository)
 void makeDiverged(GitRepository &repository)
 {
     makeBranches(repository);
-    repository.write("other", "ours\n");
-    repository.commitAll("on main");
+    repository.commitAll(writes("other", "ours\n"), "on main");
 }
 
 void makeHidden(GitRepository &repository)
 {
     makePlain(repository);
-    repository.symlink("file", "link");
-    repository.commitAll("link");
-    repository.git({"checkout", "--quiet", "-b", "topic"});
-    repository.write("sub/inside", "theirs\n");
-    repository.commitAll("on topic");
-    repository.git({"checkout", "--quiet", "main"});
-    repository.write("other", "ours\n");
-    repository.commitAll("on main");
+    repository.commitAll(links("file", "link"), "link");
+    diverge(repository, writes("other", "ours\n"), writes("sub/inside", "theirs\n"));
     repository.git({"update-index", "--skip-worktree", "link", "sub/inside"});
 }
 
@@ -224,13 +203,9 @@ void makeMergingSubmodule(GitRepository &repository)
     repository.commit("submodule");
     GitRepository submodule(repository / "moved");
     const std::string before = submodule.line({"rev-parse", "HEAD"});
-    repository.git({"checkout", "--quiet", "-b", "topic"});
-    submodule.commitAll("moved");
-    repository.commitAll("on topic");
-    repository.git({"checkout", "--quiet", "main"});
+    repository.makeBranch("topic", [&](const GitRepository &) { submodule.commitAll("moved"); });
     submodule.git({"checkout", "--quiet", before});
-    repository.write("other", "ours\n");
-    repository.commitAll("on main");
+    repository.commitAll(writes("other", "ours\n"), "on main");
     repository.git({"merge", "--quiet", "--no-commit", "topic"});
 }
 
@@ -249,24 +224,14 @@ void makeConflict(GitRepository &repository)
 void makeMergedBesideLock(GitRepository &repository)
 {
     makePlain(repository);
-    repository.git({"checkout", "--quiet", "-b", "topic"});
-    repository.write("file", "1\n2\ntheirs\n");
-    repository.write("file.lock", "theirs\n");
-    repository.commitAll("on topic");
-    repository.git({"checkout", "--quiet", "main"});
-    repository.write("file", "ours\n2\n3\n");
-    repository.commitAll("on main");
+    diverge(repository, writes("file", "ours\n2\n3\n"),
+            writes("file", "1\n2\ntheirs\n") + writes("file.lock", "theirs\n"));
 }
 
 void makeFileAndFolder(GitRepository &repository)
 {
     makePlain(repository);
-    repository.git({"checkout", "--quiet", "-b", "topic"});
-    repository.write("new", "theirs\n");
-    repository.commitAll("on topic");
-    repository.git({"checkout", "--quiet", "main"});
-    repository.write("new/inside", "ours\n");
-    repository.commitAll("on main");
+    diverge(repository, writes("new/inside", "ours\n"), writes("new", "theirs\n"));
 }
 
 void makeUnmergeableConflict(GitRepository &repository)
@@ -292,15 +257,13 @@ void makeRemote(GitRepository &repository)
     const std::string origin = repository.path().parent_path() / "origin";
     repository.git({"clone", "--quiet", "--bare", ".", origin});
     repository.git({"remote", "add", "origin", origin});
-    repository.write("file", "theirs\n");
-    repository.commitAll("on origin");
+    repository.commitAll(writes("file", "theirs\n"), "on origin");
     repository.git({"push", "--quiet", origin, "main"});
     repository.git({"reset", "--quiet", "--hard", "HEAD~1"});
     // So that the objects have to be fetched.
     repository.git({"reflog", "expire", "--expire=now", "--all"});
     repository.git({"gc", "--quiet", "--prune=now"});
-    repository.write("other", "ours\n");
-    repository.commitAll("here");
+    repository.commitAll(writes("other", "ours\n"), "here");
 }
 
 void makeAttributes(GitRepository &repository)

@@ -17,13 +17,10 @@ namespace
 
 namespace fs = std::filesystem;
 namespace git = vclink::git;
-using vclink::test::asPath;
-using vclink::test::RepositoryState;
-using vclink::test::stampOf;
-using vclink::test::workingTreeOf;
+using namespace vclink::test;
 
 /// What is beside the files that an operation writes: "topic" adds "folder/new" and changes "file".
-class Neighbours : public vclink::test::MergeFixture
+class Neighbours : public MergeFixture
 {
   protected:
     Neighbours()
@@ -32,17 +29,12 @@ class Neighbours : public vclink::test::MergeFixture
         repository_.write(".git/info/exclude", "*.log\n");
         repository_.commitAll("folder");
         repository_.git({"tag", "begin"});
-        makeBranch("topic",
-                   [this]
-                   {
-                       repository_.write("folder/new", "theirs");
-                       repository_.write("file", "theirs\n");
-                   });
-        makeBranch("ours", writing("other", "ours\n"));
+        makeBranch("topic", writes("folder/new", "theirs") + writes("file", "theirs\n"));
+        makeBranch("ours", writes("other", "ours\n"));
         repository_.symlink("../file", "folder/link");
         repository_.symlink("nowhere", "a link");
-        for (const auto *name : {"folder/own", "own", "own.log", "folder/own.log", "mine/own"})
-            repository_.write(name, "mine\n");
+        writesEach({"folder/own", "own", "own.log", "folder/own.log", "mine/own"},
+                   "mine\n")(repository_);
     }
 
     /// Each operation that checks out with a strategy of its own, by name.
@@ -80,7 +72,7 @@ TEST_F(Neighbours, StayWhateverStrategyTheFactoryGives)
         {
             SCOPED_TRACE(name);
             const auto before = workingTreeOf(repository_);
-            const auto factory = std::make_shared<vclink::test::TestOptionsFactory>(interactor_);
+            const auto factory = std::make_shared<TestOptionsFactory>(interactor_);
             factory->checkoutOptions.checkoutStrategy = strategy;
             git::GitAdapter adapter(asPath(repository_.path()), factory);
             perform(adapter);

@@ -6,7 +6,7 @@
 #include <string>
 #include <vector>
 
-#include "support/GitRepository.hpp"
+#include "support/Change.hpp"
 
 namespace vclink::test
 {
@@ -30,7 +30,7 @@ struct Place
     /// a branch of the working copy that makeSurroundings() makes
     std::string branch;
     /// Clears the place, where even what it holds is in the way.
-    std::function<void(const GitRepository &copy)> giveWay = [](const GitRepository &) {};
+    Change giveWay = changesNothing;
 };
 
 /// Something in a working copy that is not as it was committed.

@@ -32,6 +32,11 @@ Snapshot look(const fs::path &folder)
     return takeSnapshot(folder / "copy", folder);
 }
 
+bool contains(const std::vector<std::string> &names, const std::string &name)
+{
+    return std::find(names.begin(), names.end(), name) != names.end();
+}
+
 std::string describe(bool isDone, const Snapshot &after)
 {
     if (isDone)
@@ -40,6 +45,28 @@ std::string describe(bool isDone, const Snapshot &after)
 }
 
 } // namespace
+
+std::ostream &operator<<(std::ostream &stream, const BranchOperation &operation)
+{
+    return stream << operation.name << (operation.hasSiblings ? " beside siblings" : "");
+}
+
+void mergeBranch(git::BranchManager &branches, const std::string &branch)
+{
+    branches.merge(branch);
+}
+
+void switchBranch(git::BranchManager &branches, const std::string &branch)
+{
+    branches.switchBranch(branch);
+}
+
+std::ostream &operator<<(std::ostream &stream, Listed listed)
+{
+    return stream << (listed == Listed::OtherFile  ? "OfAnotherFile"
+                      : listed == Listed::Obstacle ? "OfWhatIsInTheWay"
+                                                   : "OfWhatIsInTheWayAndSiblings");
+}
 
 Surroundings::Surroundings(void (*make)(const fs::path &folder))
 {
@@ -52,6 +79,87 @@ void Surroundings::go(const std::string &branch)
 {
     original().git({"switch", "--quiet", branch});
     committed_ = committedContents(original_ / "copy");
+}
+
+void Surroundings::checkOperation(const BranchOperation &operation,
+                                  const std::vector<Obstacle> &obstacles)
+{
+    operation.clear(original());
+    go(operation.start);
+    operation.begin(original());
+    for (const auto &place : operation.places())
+    {
+        for (const auto &obstacle : obstacles)
+        {
+            const int commonOnes = int{place.isCommon} + int{obstacle.isCommon};
+            const bool isLeftOut =
+                (!operation.branches.empty() && !contains(operation.branches, place.branch)) ||
+                (operation.hasSiblings && !hasSibling(place));
+            if (obstacle.place != place.holds || commonOnes < operation.commonOnes || isLeftOut)
+                continue;
+            auto byGit = operation.byGit;
+            byGit.push_back(place.branch);
+            const auto operate = [&](CMAdapter &adapter, const fs::path &)
+            { operation.byLibrary(*git::BranchManager::create(adapter), place.branch); };
+            check({{operation.name, obstacle.name, place.name, "", "", operation.hasSiblings},
+                   obstacle,
+                   place,
+                   byGit,
+                   operate});
+        }
+    }
+    conclude(operation.name, operation.hasSiblings);
+}
+
+void Surroundings::checkReverts(const std::string &operation, Listed listed,
+                                const std::string &missing, const std::vector<Place> &places,
+                                const std::vector<Obstacle> &obstacles)
+{
+    const bool hasSiblings = listed == Listed::ObstacleAndSibling;
+    go("main");
+    for (const auto &place : places)
+    {
+        for (const auto &obstacle : obstacles)
+        {
+            const bool isWorthwhile =
+                hasSiblings ? hasSibling(place) : listed == Listed::Obstacle || obstacle.isCommon;
+            if (obstacle.place != place.holds || place.branch != "unrelated" || !isWorthwhile)
+                continue;
+            std::vector<std::string> names{missing};
+            std::vector<std::string> byGit{
+                "restore", "--source=HEAD", "--staged", "--worktree", "--ignore-skip-worktree-bits",
+                missing};
+            if (listed != Listed::OtherFile)
+            {
+                // A folder is named by a file below it.
+                names.push_back(place.path + (place.holds == Holds::Folder ? "/file" : ""));
+                // git refuses names of what is in no commit and not in the index.
+                if (place.holds != Holds::Nothing || obstacle.name.find("staged") == 0)
+                    byGit.push_back(names.back());
+            }
+            const std::string sibling = siblingOf(place.path);
+            if (hasSiblings)
+            {
+                byGit.push_back(sibling);
+                names.push_back(sibling);
+            }
+            const auto revert = [&](CMAdapter &adapter, const fs::path &copy)
+            {
+                std::vector<upath> paths;
+                for (const auto &name : names)
+                    paths.push_back(asPath((copy / name).string()));
+                adapter.revertFiles(paths);
+            };
+            const Change edit = hasSiblings ? writes(sibling, "edited\n") : changesNothing;
+            check({{operation, obstacle.name, place.name, "", "", hasSiblings},
+                   obstacle,
+                   place,
+                   byGit,
+                   revert,
+                   removes(missing) + edit});
+        }
+    }
+    conclude(operation, hasSiblings);
 }
 
 void Surroundings::check(const Cell &cell)
@@ -101,13 +209,15 @@ void Surroundings::conclude(const std::string &operation, bool hasSiblings) cons
     }
 }
 
-std::string Surroundings::outcomeOf(const Obstacle &obstacle, const std::function<void()> &action)
+std::string Surroundings::outcomeByLibrary(const Cell &cell, const fs::path &copy)
 {
-    const auto textOf = [&action]() -> std::string
+    const auto textOf = [&]() -> std::string
     {
         try
         {
-            action();
+            const auto adapter = git::GitAdapterFactory().createAdapterFor(
+                asPath(copy.string()), std::make_shared<TestInteractor>());
+            cell.byLibrary(*adapter, copy);
             return {};
         }
         catch (const std::exception &exception)
@@ -115,13 +225,7 @@ std::string Surroundings::outcomeOf(const Obstacle &obstacle, const std::functio
             return std::string("raised ") + exception.what();
         }
     };
-    return obstacle.mayBlock ? runInChild(textOf, patience) : textOf();
-}
-
-std::unique_ptr<CMAdapter> Surroundings::makeAdapter(const fs::path &copy)
-{
-    return git::GitAdapterFactory().createAdapterFor(asPath(copy.string()),
-                                                     std::make_shared<TestInteractor>());
+    return cell.obstacle.mayBlock ? runInChild(textOf, patience) : textOf();
 }
 
 fs::path Surroundings::makeTwin(const Cell &cell, const std::string &side, bool isObstructed)
@@ -143,7 +247,7 @@ void Surroundings::compare(const Cell &cell)
     const fs::path git = makeTwin(cell, "git");
     const Snapshot before = look(library);
 
-    const std::string raised = cell.byLibrary(library / "copy");
+    const std::string raised = outcomeByLibrary(cell, library / "copy");
     const auto byGit = GitRepository(git / "copy").command(cell.byGit).timeout(patience).run();
     EXPECT_FALSE(byGit.timedOut);
 
@@ -189,7 +293,7 @@ void Surroundings::expectWorksWithoutObstacle(const Cell &cell, const fs::path &
     clearSurroundings(original_, library);
     cell.place.giveWay(GitRepository(library / "copy"));
     cell.prepare(GitRepository(library / "copy"));
-    const std::string raised = cell.byLibrary(library / "copy");
+    const std::string raised = outcomeByLibrary(cell, library / "copy");
     const Snapshot after = look(library);
     EXPECT_NE(describe(raised.empty(), after), refuses)
         << raised << " though nothing is in the way any more";

@@ -4,21 +4,57 @@
 #include <chrono>
 #include <filesystem>
 #include <functional>
+#include <iosfwd>
 #include <map>
-#include <memory>
 #include <set>
 #include <string>
 #include <vector>
 
 #include "Situation.hpp"
 #include "differential/Snapshot.hpp"
+#include "support/Change.hpp"
 #include "support/GitFixture.hpp"
 #include "support/LibGit2Session.hpp"
 #include "surroundingDifferences.hpp"
 #include "vclink/CMAdapter.hpp"
+#include "vclink/git/BranchManager.hpp"
 
 namespace vclink::test
 {
+
+/// An operation on branches, by the library and by git, on a working copy that is on `start`.
+struct BranchOperation
+{
+    std::string name;
+    std::string start;
+    std::vector<std::string> byGit;
+    void (*byLibrary)(git::BranchManager &branches, const std::string &branch);
+    /// of place and obstacle, how many have to be common
+    int commonOnes;
+    /// none for all
+    std::vector<std::string> branches{};
+    const std::vector<Place> &(*places)() = submodulePlaces;
+    /// Completes what a switch to the branch `start` has left.
+    Change begin = changesNothing;
+    bool hasSiblings = false;
+    /// Lets git switch to the branch `start`.
+    Change clear = changesNothing;
+};
+
+std::ostream &operator<<(std::ostream &stream, const BranchOperation &operation);
+
+void mergeBranch(git::BranchManager &branches, const std::string &branch);
+void switchBranch(git::BranchManager &branches, const std::string &branch);
+
+/// What is in the list of a revert.
+enum class Listed
+{
+    OtherFile,
+    Obstacle,
+    ObstacleAndSibling
+};
+
+std::ostream &operator<<(std::ostream &stream, Listed listed);
 
 /// Every obstacle in every place, for one operation: the library in one working copy, git in its
 /// twin. VCLINK_CELL names a part of the situations to look at alone, as they are printed.
@@ -35,15 +71,21 @@ class Surroundings : public GitFixture
         return GitRepository(original_ / "copy");
     }
 
+    /// Each of these obstacles in the places of the operation.
+    void checkOperation(const BranchOperation &operation, const std::vector<Obstacle> &obstacles);
+    /// Reverts on main of a file that is missing, and of what is listed beside it.
+    void checkReverts(const std::string &operation, Listed listed, const std::string &missing,
+                      const std::vector<Place> &places, const std::vector<Obstacle> &obstacles);
+
+  private:
     struct Cell
     {
         Comparand situation;
         const Obstacle &obstacle;
         const Place &place;
         std::vector<std::string> byGit;
-        /// @return what was thrown
-        std::function<std::string(const std::filesystem::path &copy)> byLibrary;
-        std::function<void(const GitRepository &copy)> prepare = [](const GitRepository &) {};
+        std::function<void(CMAdapter &adapter, const std::filesystem::path &copy)> byLibrary;
+        Change prepare = changesNothing;
     };
 
     void check(const Cell &cell);
@@ -51,11 +93,8 @@ class Surroundings : public GitFixture
     void conclude(const std::string &operation, bool hasSiblings = false) const;
     /// Whether there is something else to look at beside siblings.
     bool hasSibling(const Place &place) const;
-
-    static std::string outcomeOf(const Obstacle &obstacle, const std::function<void()> &action);
-    static std::unique_ptr<CMAdapter> makeAdapter(const std::filesystem::path &copy);
-
-  private:
+    /// @return what was thrown
+    static std::string outcomeByLibrary(const Cell &cell, const std::filesystem::path &copy);
     std::filesystem::path makeTwin(const Cell &cell, const std::string &side,
                                    bool isObstructed = true);
     void compare(const Cell &cell);

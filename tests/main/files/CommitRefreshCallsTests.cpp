@@ -42,23 +42,6 @@ class RefreshOfACommit : public CommitCallsFixture
     }
 };
 
-TEST_F(RefreshOfACommit, IsOfTheWholeIndexWithoutACallback)
-{
-    int count = 0;
-    startNoting();
-    calls_->on<git_index_update_all>(
-        [&](git_index *, const git_strarray *pathspec, git_index_matched_path_cb callback,
-            void *payload)
-        {
-            ++count;
-            EXPECT_EQ(pathspec, nullptr);
-            EXPECT_EQ(callback, nullptr);
-            EXPECT_EQ(payload, nullptr);
-        });
-    commitOnce();
-    EXPECT_EQ(count, 1);
-}
-
 TEST_F(RefreshOfACommit, ComesAfterWhatChangedIsStagedByItsPath)
 {
     repository_.write("file", "changed\n");

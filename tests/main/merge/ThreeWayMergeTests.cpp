@@ -137,13 +137,7 @@ TEST_F(ThreeWayMerge, OfCrissCrossHistoriesCanTakeNothingOfTheirs)
 {
     makeDiverged();
     const auto change = writes("file", "the same\n");
-    const auto changeWithoutNew = [this, &change]
-    {
-        change();
-        repository_.remove("ours");
-        repository_.remove("theirs");
-    };
-    crissCross(changeWithoutNew, change);
+    crissCross(change + removes("ours") + removes("theirs"), change);
     expectCleanAsGit();
 }
 
