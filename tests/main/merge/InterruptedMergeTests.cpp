@@ -378,15 +378,7 @@ TEST_F(InterruptedMerge, IsNoneOfARenameThatIsResolvedToOurs)
 /// A merge takes nothing of it.
 TEST_F(InterruptedMerge, IsNoneOfATypeThatChangesWhereOursIsRenamed)
 {
-    diverge(
-        [this] {
-            repository_.git({"mv", "file", "renamed"});
-        },
-        [this]
-        {
-            repository_.remove("file");
-            repository_.symlink("other", "file");
-        });
+    diverge(moves("file", "renamed"), removes("file") + links("other", "file"));
     beginMergeAsLibGit2();
     expectConcluded();
 }
