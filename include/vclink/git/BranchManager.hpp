@@ -69,8 +69,8 @@ class VCLINK_GIT_EXPORT BranchManager
     /// an ignored file that the branch tracks. Keeps changes in files that are the same in both
     /// branches, and the folders of submodules, even if the branch does not have them.
     ///
-    /// If a tag has the same name as the branch, the files of the tag are checked out, and HEAD
-    /// moves to the branch.
+    /// Also refuses while a merge, revert, cherry-pick or rebase is under way. Throws with
+    /// GIT_EAMBIGUOUS if a tag has the name of the branch and another commit.
     ///
     /// After a failure or a cancellation HEAD is unchanged. The files are too, unless one of them,
     /// or HEAD itself, could not be written. git_branch_lookup, git_revparse_single,
@@ -84,8 +84,8 @@ class VCLINK_GIT_EXPORT BranchManager
     /// git_branch_create.
     virtual void createBranch(const BranchParameters &parameters) = 0;
 
-    /// Deletes a local branch, merged or not. No reference leads to commits that only this branch
-    /// had. Fails for the current branch. git_branch_delete.
+    /// Deletes a local branch, merged or not: commits that only it had can be lost. Fails for the
+    /// current branch, and for one to which a rebase or bisection returns. git_branch_delete.
     virtual void deleteBranch(const BranchName &name) = 0;
 
     /// Returns the short name of the current branch, which HEAD points to. Fails if the repository
@@ -104,8 +104,8 @@ class VCLINK_GIT_EXPORT BranchManager
     /// - if it would overwrite an untracked file, or
     /// - if a symbolic link, FIFO, socket or device is in the way.
     ///
-    /// The merge drivers may have run by then. The added text names the first such file. If the
-    /// merge changes that file too, the text has only libgit2's number of such files.
+    /// The merge drivers may have run by then. docs/limitations.md has more cases. The added text
+    /// names the first such file, or only libgit2's number of them if the merge changes it too.
     ///
     /// Restores missing files and overwrites ignored ones. Keeps the folders of submodules; the
     /// merge commit records the submodules' commits as merged, whatever is checked out in them.
