@@ -80,8 +80,8 @@ class CloneCommand : public Command
                                   "it,\nnamed like the repository"));
         line.footer(say("Copies a repository with its history, and writes the files of its current "
                         "branch. It becomes the\nremote \"origin\" of the working copy.\n\n"
-                        "Never prompts: keys come from an ssh agent, and passwords are never sent. "
-                        "Every certificate and\nhost key is accepted."));
+                        "Never prompts: keys come from an ssh agent, and a password only from the "
+                        "address. Every\ncertificate and host key is accepted."));
     }
 
     ExitStatus run(Session &session) override

@@ -62,14 +62,15 @@ constexpr Translation commandHelpRows[] = {
      "作成する作業コピー: 新しいフォルダーまたは空のフォルダー。\n省略するとリポジトリと同じ名前"},
     {"Copies a repository with its history, and writes the files of its current branch. It becomes "
      "the\nremote \"origin\" of the working copy.\n\nNever prompts: keys come from an ssh agent, "
-     "and passwords are never sent. Every certificate and\nhost key is accepted.",
+     "and a password only from the address. Every\ncertificate and host key is accepted.",
      "Kopiert ein Repository mit seiner Geschichte und schreibt die Dateien seines aktuellen "
      "Branch. Es\nwird das entfernte Repository \"origin\" der Arbeitskopie.\n\nFragt nie nach: "
-     "Schlüssel kommen von einem ssh-Agenten, Passwörter werden nie gesendet. Jedes\nZertifikat "
+     "Schlüssel kommen von einem ssh-Agenten, ein Passwort nur aus der Adresse. Jedes\nZertifikat "
      "und jeder Hostschlüssel wird akzeptiert.",
      "リポジトリを履歴ごとコピーし、現在のブランチのファイルを書き出します。元のリポジトリは作業コ"
      "ピーの\nリモート \"origin\" になります。\n\n入力は求めません。鍵は ssh "
-     "エージェントから取得し、パスワードは送りません。証明書とホスト鍵は\nすべて受け入れます。"},
+     "エージェントから、パスワードはアドレスからのみ取得します。\n証明書とホスト鍵はすべて受け入れ"
+     "ます。"},
     {"What the commit says", "Was der Commit sagt", "コミットメッセージ"},
     {"Has no effect: a commit takes all changes anyway",
      "Ändert nichts: Ein Commit nimmt ohnehin alle Änderungen",
