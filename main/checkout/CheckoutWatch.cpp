@@ -26,7 +26,8 @@ using ChangeRule = Finding (*)(WorkingCopy &, const TreeChange &);
 
 // A file that stays a file needs only the first array of each pair.
 constexpr std::array<ChangeRule, 2> switchRules{findBlockedWay, findSpecialFile};
-constexpr std::array<ChangeRule, 10> otherSwitchRules{findIgnoredLink,
+constexpr std::array<ChangeRule, 11> otherSwitchRules{findIgnoredLink,
+                                                      findFalselyIgnored,
                                                       findForeignInFolder,
                                                       findMissingFolder,
                                                       findSubmodule,
@@ -150,7 +151,7 @@ void CheckoutWatch::lookBeforeMerge(const git_oid *theirs)
                          {
                              found = judgeMerge(copy, change, after.get());
                              renamed.note(copy, change);
-                             toFolders.note(copy, change);
+                             toFolders.note(copy, change, after.get());
                              if (!staysFile(change))
                              {
                                  merged_.noteChange(copy, change);

@@ -2,12 +2,14 @@
 #include "main/checkout/RemadeFiles.hpp"
 
 #include <cerrno>
+#include <cstddef>
 
 #include <fcntl.h>
 #include <sys/stat.h>
 #include <unistd.h>
 
 #include "error/errorUtil/raiseSystemError.hpp"
+#include "main/checkout/standing.hpp"
 
 namespace vclink::git
 {
@@ -41,8 +43,7 @@ bool isRemovable(const std::string &path, const struct stat &status)
 {
     const std::string folder = path.substr(0, path.rfind('/') + 1);
     struct stat above = {};
-    if (::faccessat(AT_FDCWD, folder.c_str(), W_OK | X_OK, AT_EACCESS) != 0 ||
-        ::stat(folder.c_str(), &above) != 0)
+    if (!unwritableFolderAbove(path).empty() || ::stat(folder.c_str(), &above) != 0)
     {
         return false;
     }
@@ -70,7 +71,7 @@ std::string RemadeFiles::note(const std::string &path, bool isExecutable)
         {
             raiseUnexamined(error, path);
         }
-        return {};
+        return isCreatable(path) ? "" : "cannot be created in its folder";
     }
     if (!S_ISREG(status.st_mode))
     {
@@ -100,6 +101,18 @@ std::string RemadeFiles::note(const std::string &path, bool isExecutable)
         paths_.push_back(path);
     }
     return {};
+}
+
+bool RemadeFiles::isCreatable(const std::string &path)
+{
+    const std::size_t size = path.rfind('/') + 1;
+    if (path.compare(0, size, folder_) == 0)
+    {
+        return isFolderWritable_;
+    }
+    folder_ = path.substr(0, size);
+    isFolderWritable_ = unwritableFolderAbove(path).empty();
+    return isFolderWritable_;
 }
 
 void RemadeFiles::remove() noexcept

@@ -20,7 +20,7 @@ class RemadeFiles
   public:
     /// Notes a file if it must be made anew. Call it for each file before the checkout writes the
     /// first one.
-    /// @param path absolute; ignored if there is no file
+    /// @param path absolute; if there is no file, only the folders above are looked at
     /// @param isExecutable what the checkout makes of it
     /// @return empty, or why the checkout cannot write the file
     /// @throws LibGit2Exception if the path cannot be examined
@@ -30,6 +30,11 @@ class RemadeFiles
     void remove() noexcept;
 
   private:
+    bool isCreatable(const std::string &path);
+
+    /// The folder that was looked at last, and what came out.
+    std::string folder_;
+    bool isFolderWritable_ = true;
     std::vector<std::string> paths_;
 };
 

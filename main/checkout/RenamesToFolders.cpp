@@ -50,10 +50,22 @@ bool isSameFolder(const git_tree *left, const git_tree *right, const std::string
            isSameId(*git_tree_entry_id(leftEntry.get()), *git_tree_entry_id(rightEntry.get()));
 }
 
-Finding findRenameTo(git_repository *repository, git_tree *before, git_tree *after,
-                     const std::set<std::string> &files)
+bool isBelow(const std::set<std::string> &folders, const std::string &path)
 {
-    if (files.empty())
+    for (auto end = path.find('/'); end != std::string::npos; end = path.find('/', end + 1))
+    {
+        if (folders.count(path.substr(0, end)) != 0)
+        {
+            return true;
+        }
+    }
+    return false;
+}
+
+Finding findRenameTo(git_repository *repository, git_tree *before, git_tree *after,
+                     const std::set<std::string> &files, const std::set<std::string> &folders)
+{
+    if (files.empty() && folders.empty())
     {
         return {};
     }
@@ -63,13 +75,22 @@ Finding findRenameTo(git_repository *repository, git_tree *before, git_tree *aft
     for (std::size_t i = 0; i < count; ++i)
     {
         const git_diff_delta *const delta = git_diff_get_delta(diff.get(), i);
-        if (delta != nullptr && delta->status == GIT_DELTA_RENAMED &&
-            files.count(delta->new_file.path) != 0)
+        if (delta == nullptr || delta->status != GIT_DELTA_RENAMED)
         {
-            const std::string name = delta->new_file.path;
+            continue;
+        }
+        const std::string name = delta->new_file.path;
+        if (files.count(name) != 0)
+        {
             return Obstacle{name, "'" + name +
                                       "' is a renamed file of one side and a folder of the other: "
                                       "merge with 'git merge'"};
+        }
+        if (isBelow(folders, name))
+        {
+            return Obstacle{name, "'" + name +
+                                      "' is a renamed file of one side, in a folder that is a "
+                                      "changed file of the other: merge with 'git merge'"};
         }
     }
     return {};
@@ -77,8 +98,9 @@ Finding findRenameTo(git_repository *repository, git_tree *before, git_tree *aft
 
 } // namespace
 
-void RenamesToFolders::note(WorkingCopy &copy, const TreeChange &change)
+void RenamesToFolders::note(WorkingCopy &copy, const TreeChange &change, const git_tree *theirs)
 {
+    noteFolder(copy, change, theirs);
     if (change.after == nullptr || copy.entryOf(change.path) != nullptr)
     {
         return;
@@ -88,6 +110,28 @@ void RenamesToFolders::note(WorkingCopy &copy, const TreeChange &change)
         filesOfTheirs_.insert(change.path);
     }
     noteFileAbove(copy, change.path);
+}
+
+void RenamesToFolders::noteFolder(WorkingCopy &copy, const TreeChange &change,
+                                  const git_tree *theirs)
+{
+    if (change.before == nullptr || isGitlink(change.before))
+    {
+        return;
+    }
+    const git_index_entry *const ours = copy.entryOf(change.path);
+    if (change.after == nullptr && ours != nullptr && !isOf(*ours, change.before))
+    {
+        const OwnedTreeEntry other = findInTree(theirs, change.path);
+        if (other != nullptr && git_tree_entry_type(other.get()) == GIT_OBJECT_TREE)
+        {
+            foldersOfTheirs_.insert(change.path);
+        }
+    }
+    else if (change.after != nullptr && ours == nullptr && copy.hasEntryBelow(change.path))
+    {
+        foldersOfOurs_.insert(change.path);
+    }
 }
 
 void RenamesToFolders::noteFileAbove(WorkingCopy &copy, const std::string &path)
@@ -120,8 +164,9 @@ Finding RenamesToFolders::find(git_repository *repository, const WorkingCopy &co
             files.insert(file);
         }
     }
-    Finding found = findRenameTo(repository, before, theirs, files);
-    return found ? found : findRenameTo(repository, before, copy.head(), filesOfOurs_);
+    Finding found = findRenameTo(repository, before, theirs, files, foldersOfTheirs_);
+    return found ? found
+                 : findRenameTo(repository, before, copy.head(), filesOfOurs_, foldersOfOurs_);
 }
 
 } // namespace vclink::git

@@ -14,14 +14,16 @@ namespace vclink::git
 {
 
 /// A rule of a merge: finds a file that one side has renamed to the name of a folder in which the
-/// other side has added or changed something. libgit2 would fail in the middle of its writing, or
-/// merge neither the file nor the folder. If the file is new, libgit2 has a conflict instead.
+/// other side has added or changed something, or into a folder whose name is a file that the other
+/// side has changed. libgit2 would fail in the middle of its writing, or merge neither the file nor
+/// the folder. If the renamed file were a new one, libgit2 would have a conflict.
 class RenamesToFolders
 {
   public:
     /// Notes a name that is a file of one side and a folder of the other.
     /// @throws LibGit2Exception
-    void note(WorkingCopy &copy, const TreeChange &change);
+    /// @param theirs the other side's tree
+    void note(WorkingCopy &copy, const TreeChange &change, const git_tree *theirs);
 
     /// Looks for renames among the noted files. Compares the trees only if there are any.
     /// @param before the tree of a merge base, null for the empty tree
@@ -31,10 +33,14 @@ class RenamesToFolders
                  git_tree *theirs) const;
 
   private:
+    void noteFolder(WorkingCopy &copy, const TreeChange &change, const git_tree *theirs);
     void noteFileAbove(WorkingCopy &copy, const std::string &path);
 
     std::set<std::string> filesOfOurs_;
     std::set<std::string> filesOfTheirs_;
+    /// In the place of a file that the other side has changed.
+    std::set<std::string> foldersOfOurs_;
+    std::set<std::string> foldersOfTheirs_;
     /// The folder whose parents were looked up last: names come in the order of folders.
     std::string folder_;
 };

@@ -15,6 +15,7 @@
 #include "error/errorUtil/GitResult.hpp"
 #include "main/checkout/RemadeFiles.hpp"
 #include "main/checkout/gitlinks.hpp"
+#include "main/checkout/negatedPatterns.hpp"
 #include "util/repository/objectIds.hpp"
 #include "util/repository/repository.hpp"
 
@@ -41,12 +42,6 @@ bool isDirectlyIn(const std::string &folder, const std::string &name)
     const std::size_t size = folder.size();
     return name.size() > size && name[size] == '/' && name.compare(0, size, folder) == 0 &&
            name.find('/', size + 1) == std::string::npos;
-}
-
-/// Returns 0, or why files of the folder cannot be created and removed.
-int accessError(const std::string &folder)
-{
-    return ::faccessat(AT_FDCWD, folder.c_str(), W_OK | X_OK, AT_EACCESS) == 0 ? 0 : errno;
 }
 
 } // namespace
@@ -186,17 +181,12 @@ const std::string &WorkingCopy::unwritableFolderOf(const std::string &name)
     {
         return unwritable_;
     }
-    std::string folder = name.substr(0, size);
-    examined_ = folder;
-    int error = accessError(root_ + folder);
-    while (!folder.empty() && (error == ENOENT || error == ENOTDIR))
+    examined_ = name.substr(0, size);
+    unwritable_ = unwritableFolderAbove(root_ + name);
+    if (!unwritable_.empty())
     {
-        folder.pop_back();
-        folder.resize(folder.rfind('/') + 1);
-        error = accessError(root_ + folder);
+        unwritable_ = unwritable_.size() > root_.size() ? unwritable_.substr(root_.size()) : "./";
     }
-    const bool isUnwritable = error == EACCES || error == EROFS;
-    unwritable_ = isUnwritable ? (folder.empty() ? "./" : folder) : "";
     return unwritable_;
 }
 
@@ -338,6 +328,16 @@ std::string WorkingCopy::stagedBelow(const std::string &folder) const
 }
 
 bool WorkingCopy::isIgnored(const std::string &name) const
+{
+    return isIgnoredByLibGit2(name) && !mayBeNegated(repository_, root_, name);
+}
+
+bool WorkingCopy::isFalselyIgnored(const std::string &name) const
+{
+    return isIgnoredByLibGit2(name) && mayBeNegated(repository_, root_, name);
+}
+
+bool WorkingCopy::isIgnoredByLibGit2(const std::string &name) const
 {
     int ignored = 0;
     check(git_ignore_path_is_ignored, &ignored, repository_, name.c_str());

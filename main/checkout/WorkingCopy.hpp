@@ -101,8 +101,10 @@ class WorkingCopy
     /// Returns the first name below the folder that the index has and HEAD does not. Empty if there
     /// is none.
     std::string stagedBelow(const std::string &folder) const;
-    /// git_ignore_path_is_ignored.
+    /// Returns true if Git ignores the name, and no pattern may exempt it. See mayBeNegated.
     bool isIgnored(const std::string &name) const;
+    /// Returns true if libgit2 ignores the name, and Git may not. git_ignore_path_is_ignored.
+    bool isFalselyIgnored(const std::string &name) const;
     /// Returns true if the content of the file, link or folder differs from its entry in the index.
     /// A missing file does not differ.
     bool isEdited(const git_index_entry &entry);
@@ -114,6 +116,7 @@ class WorkingCopy
     git_object_t typeInHead(const std::string &name) const;
     const Way &findWay(const std::string &name);
     Way wayInto(const std::string &folder, const Way &above) const;
+    bool isIgnoredByLibGit2(const std::string &name) const;
     git_oid idOf(const std::string &name, Standing standing) const;
 
     git_repository *repository_;

@@ -15,6 +15,7 @@
 #include "error/errorUtil/GitResult.hpp"
 #include "main/checkout/gitlinks.hpp"
 #include "main/checkout/obstaclesAhead.hpp"
+#include "util/repository/objectIds.hpp"
 
 namespace vclink::git
 {
@@ -84,6 +85,14 @@ bool isThere(WorkingCopy &copy, const std::string &path, const git_tree *theirs)
 {
     return copy.at(path) != Standing::Nothing || copy.entryOf(path) != nullptr ||
            findInTree(theirs, path) != nullptr;
+}
+
+/// git never takes an empty file for a renamed one.
+Obstacle takenForRenamed(const std::string &path, const std::string &other)
+{
+    return {path, "one side has changed the empty file '" + path + "' and the other has deleted " +
+                      "it, and its change would go to '" + other +
+                      "', which is empty too: merge with 'git merge'"};
 }
 
 Obstacle besideLock(const std::string &path)
@@ -182,11 +191,20 @@ Finding RenamedLocks::findIn(git_repository *repository, WorkingCopy &copy, cons
         return isThere(copy, path + ".lock", theirs) ? besideLock(path)
                                                      : findUnwritableFolderOf(copy, path);
     };
+    const auto emptied =
+        std::find_if(candidates.begin(), candidates.end(),
+                     [](const Candidate &candidate) { return isEmptyBlob(candidate.before.id); });
     visitTreeChanges(repository, before, renaming,
                      [&](const TreeChange &change)
                      {
                          const bool isAdded = change.before == nullptr && change.after != nullptr &&
                                               !isGitlink(change.after);
+                         if (isAdded && emptied != candidates.end() &&
+                             isEmptyBlob(*git_tree_entry_id(change.after)))
+                         {
+                             found = takenForRenamed(emptied->before.path, change.path);
+                             return false;
+                         }
                          Finding obstacle = isAdded ? obstacleOf(change.path) : Finding();
                          if (obstacle &&
                              (hasCommand(repository, change.path) || isInConflict(change)))

@@ -60,6 +60,17 @@ Finding findIgnoredLink(WorkingCopy &copy, const TreeChange &change)
     return isInTheWay ? inTheWay(change.path, Standing::Link) : Finding();
 }
 
+Finding findFalselyIgnored(WorkingCopy &copy, const TreeChange &change)
+{
+    if (change.before != nullptr || change.after == nullptr || copy.entryOf(change.path) != nullptr)
+    {
+        return {};
+    }
+    const Standing standing = copy.at(change.path);
+    const bool isInTheWay = standing != Standing::Nothing && copy.isFalselyIgnored(change.path);
+    return isInTheWay ? inTheWay(change.path, standing) : Finding();
+}
+
 Finding findForeignInFolder(WorkingCopy &copy, const TreeChange &change)
 {
     if (change.before != nullptr || !makesFile(change) ||

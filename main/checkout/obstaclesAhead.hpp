@@ -44,6 +44,9 @@ Finding findStagedDeletion(WorkingCopy &copy, const TreeChange &change);
 /// discards the entry.
 Finding findStagedContent(WorkingCopy &copy, const TreeChange &change);
 
+/// Finds what libgit2 would overwrite because it takes it for ignored, in the place of a new file.
+Finding findFalselyIgnored(WorkingCopy &copy, const TreeChange &change);
+
 // Before both.
 
 /// Finds something other than a folder in the place of a new submodule, ignored or not: libgit2

@@ -79,6 +79,21 @@ bool visitFolder(const std::string &path, const std::function<bool(const std::st
     return errno == 0;
 }
 
+std::string unwritableFolderAbove(const std::string &path)
+{
+    std::string folder = path.substr(0, path.rfind('/') + 1);
+    const auto accessError = [&folder]
+    { return ::faccessat(AT_FDCWD, folder.c_str(), W_OK | X_OK, AT_EACCESS) == 0 ? 0 : errno; };
+    int error = accessError();
+    while (folder.size() > 1 && (error == ENOENT || error == ENOTDIR))
+    {
+        folder.pop_back();
+        folder.resize(folder.rfind('/') + 1);
+        error = accessError();
+    }
+    return error == EACCES || error == EROFS ? folder : "";
+}
+
 std::string readLink(const std::string &path)
 {
     std::string target(PATH_MAX, '\0');

@@ -34,6 +34,11 @@ bool holdsFiles(const std::string &path);
 /// @return false if the folder cannot be read
 bool visitFolder(const std::string &path, const std::function<bool(const std::string &)> &visitor);
 
+/// Returns the nearest folder above a path, with a slash at its end, if the process may not create
+/// and remove files in it. Empty if it may.
+/// @param path absolute
+std::string unwritableFolderAbove(const std::string &path);
+
 /// Returns the target of a link, empty if it cannot be read.
 /// @param path absolute
 std::string readLink(const std::string &path);

@@ -1,12 +1,9 @@
 // SPDX-License-Identifier: MIT
 #include "main/files/ChangedFiles.hpp"
 
-#include <algorithm>
-#include <array>
 #include <cerrno>
 #include <cstddef>
 #include <cstdint>
-#include <iterator>
 #include <optional>
 #include <string_view>
 #include <utility>
@@ -16,14 +13,12 @@
 #include <strings.h>
 #include <sys/stat.h>
 
+#include "util/repository/objectIds.hpp"
+
 namespace vclink::git
 {
 namespace
 {
-
-constexpr std::array<unsigned char, sizeof(git_oid::id)> emptyBlob{
-    0xe6, 0x9d, 0xe2, 0x9b, 0xb2, 0xd1, 0xd6, 0x43, 0x4b, 0x8b,
-    0x29, 0xae, 0x77, 0x5a, 0xd8, 0xc2, 0xe4, 0x8c, 0x53, 0x91};
 
 /// The mode that Git has for what is there. GIT_FILEMODE_UNREADABLE if it is not a file or link.
 std::uint32_t modeOf(const struct stat &status)
@@ -187,11 +182,6 @@ ChangedFiles::ChangedFiles(git_repository *repository, git_index *index)
         }
     }
     dependOnOrder_ = look.dependOnOrder();
-}
-
-bool isEmptyBlob(const git_oid &id) noexcept
-{
-    return std::equal(emptyBlob.begin(), emptyBlob.end(), std::begin(id.id));
 }
 
 bool isForAttributes(const std::string &path) noexcept

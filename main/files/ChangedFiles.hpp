@@ -50,9 +50,6 @@ class ChangedFiles
     bool dependOnOrder_ = false;
 };
 
-/// Whether the id is that of an empty file.
-bool isEmptyBlob(const git_oid &id) noexcept;
-
 /// Whether a file with this path contains attributes.
 bool isForAttributes(const std::string &path) noexcept;
 

@@ -135,7 +135,7 @@ std::vector<Tolerance> tolerancesOfCommits(const std::string &operation, const s
     };
 }
 
-std::vector<Tolerance> tolerancesOfOthers(const std::string &operation, const std::string &normal)
+std::vector<Tolerance> tolerancesOfMerges(const std::string &operation, const std::string &normal)
 {
     const std::string isOtherMerge =
         failureIn(operation, GIT_EMODIFIED, GIT_ERROR_MERGE,
@@ -144,6 +144,24 @@ std::vector<Tolerance> tolerancesOfOthers(const std::string &operation, const st
     const std::string hasConflicts = mergeFailure(textOf(shared_vclink::git::HasConflicts()));
     const std::string badState =
         mergeFailure(textOf(shared_vclink::git::UnableToMergeBadRepositoryState()));
+    return {
+        // Any state but the normal one refuses the merge, any answer but no means conflicts.
+        {"merge", "git_repository_state", 1, any, badState},
+        {"merge", "git_repository_state", 2, any, badState},
+        {"merge", "git_repository_state", 3, any, isOtherMerge},
+        {"merge", "git_index_has_conflicts", any, any, hasConflicts},
+        // The first look-up chooses the words of the message, the second is the commit's, after
+        // those of the look before the merge.
+        {"merge", "git_reference_dwim", 1, any, normal},
+        {"merge", "git_reference_dwim", 2, any, isOtherMerge},
+        {"merge", "git_commit_lookup", 3, any, isOtherMerge},
+        // Without its command a driver leaves the file to libgit2's own merge.
+        {"mergeByTool", "git_config_get_entry", any, any, hasConflicts},
+    };
+}
+
+std::vector<Tolerance> tolerancesOfOthers(const std::string &operation, const std::string &normal)
+{
     return {
         // Only a missing folder is no failure of a probe.
         {"isAdapterFor", "git_repository_open_ext", any, GIT_ENOTFOUND, "done: 0"},
@@ -186,21 +204,9 @@ std::vector<Tolerance> tolerancesOfOthers(const std::string &operation, const st
         {"switchBranchInPartialClone", "git_odb_exists", any, any, normal},
         // A state without a name.
         {"getRepositoryState", "git_repository_state", any, any, "done: "},
-        // Any state but the normal one refuses the merge, any answer but no means conflicts.
-        {"merge", "git_repository_state", 1, any, badState},
-        {"merge", "git_repository_state", 2, any, badState},
-        {"merge", "git_repository_state", 3, any, isOtherMerge},
         // The library ends the comparison itself as soon as it has seen something of that.
         {"commitMergeWithoutMark", "git_diff_tree_to_tree", any, any, normal, true},
         {"commitMergeWithoutMark", "git_merge_bases", any, GIT_ENOTFOUND, normal},
-        {"merge", "git_index_has_conflicts", any, any, hasConflicts},
-        // The first look-up chooses the words of the message, the second is the commit's, after
-        // those of the look before the merge.
-        {"merge", "git_reference_dwim", 1, any, normal},
-        {"merge", "git_reference_dwim", 2, any, isOtherMerge},
-        {"merge", "git_commit_lookup", 3, any, isOtherMerge},
-        // Without its command a driver leaves the file to libgit2's own merge.
-        {"mergeByTool", "git_config_get_entry", any, any, hasConflicts},
         // No value is what the reads of the configuration make of every failure.
         {"globalFilePath", "git_config_find_global", any, any, "done: nothing"},
         {"read", "git_config_get_string_buf", any, any, "done: nothing"},
@@ -214,6 +220,8 @@ std::vector<Tolerance> tolerancesOfOthers(const std::string &operation, const st
 std::vector<Tolerance> tolerancesOf(const std::string &operation, const std::string &normal)
 {
     std::vector<Tolerance> all = tolerancesOfCommits(operation, normal);
+    const std::vector<Tolerance> merges = tolerancesOfMerges(operation, normal);
+    all.insert(all.end(), merges.begin(), merges.end());
     const std::vector<Tolerance> others = tolerancesOfOthers(operation, normal);
     all.insert(all.end(), others.begin(), others.end());
     return all;

@@ -1,0 +1,111 @@
+// SPDX-License-Identifier: MIT
+#include "main/checkout/negatedPatterns.hpp"
+
+#include <cstddef>
+#include <cstdlib>
+#include <fstream>
+
+#include <fnmatch.h>
+#include <git2/buffer.h>
+#include <git2/config.h>
+#include <git2/repository.h>
+
+#include "error/errorUtil/GitResult.hpp"
+#include "main/checkout/standing.hpp"
+
+namespace vclink::git
+{
+namespace
+{
+
+constexpr const char *byteOrderMark = "\xEF\xBB\xBF";
+
+/// Returns the part of a pattern that the name of a file or of a folder above it must match.
+std::string lastElement(std::string pattern)
+{
+    const auto end = pattern.find_last_not_of(" \t\r/");
+    pattern.resize(end == std::string::npos ? 0 : end + 1);
+    return pattern.substr(pattern.rfind('/') + 1);
+}
+
+bool matchesAnElement(const std::string &pattern, const std::string &name)
+{
+    std::size_t begin = 0;
+    for (auto end = name.find('/'); begin < name.size(); end = name.find('/', begin))
+    {
+        const std::string element = name.substr(begin, end - begin);
+        if (::fnmatch(pattern.c_str(), element.c_str(), FNM_CASEFOLD) == 0)
+        {
+            return true;
+        }
+        begin = end == std::string::npos ? name.size() : end + 1;
+    }
+    return false;
+}
+
+bool mayNegate(const std::string &path, const std::string &name)
+{
+    std::ifstream file(path);
+    if (!file)
+    {
+        return standingAt(path) != Standing::Nothing;
+    }
+    for (std::string line; std::getline(file, line);)
+    {
+        if (line.rfind(byteOrderMark, 0) == 0)
+        {
+            line.erase(0, 3);
+        }
+        if (!line.empty() && line.front() == '!' &&
+            matchesAnElement(lastElement(line.substr(1)), name))
+        {
+            return true;
+        }
+    }
+    return file.bad();
+}
+
+/// Returns the setting, empty if there is none.
+std::string excludesFile(git_repository *repository)
+{
+    const auto config = acquire<git_config>(git_repository_config_snapshot, repository);
+    git_buf path = {};
+    const bool isSet =
+        config.has_value() &&
+        call(git_config_get_path, &path, config.value().get(), "core.excludesfile").has_value();
+    std::string text = isSet ? std::string(path.ptr, path.size) : std::string();
+    git_buf_dispose(&path);
+    return text;
+}
+
+std::string inEnvironment(const char *variable, const char *path)
+{
+    const char *const folder = std::getenv(variable);
+    return folder != nullptr && *folder != '\0' ? folder + std::string(path) : std::string();
+}
+
+} // namespace
+
+bool mayBeNegated(git_repository *repository, const std::string &root, const std::string &name)
+{
+    for (const std::string &path :
+         {git_repository_commondir(repository) + std::string("info/exclude"),
+          excludesFile(repository), inEnvironment("XDG_CONFIG_HOME", "/git/ignore"),
+          inEnvironment("HOME", "/.config/git/ignore"), root + ".gitignore"})
+    {
+        if (!path.empty() && mayNegate(path, name))
+        {
+            return true;
+        }
+    }
+    for (auto end = name.find('/'); end != std::string::npos; end = name.find('/', end + 1))
+    {
+        if (mayNegate(root + name.substr(0, end) + "/.gitignore", name))
+        {
+            return true;
+        }
+    }
+    return false;
+}
+
+} // namespace vclink::git
