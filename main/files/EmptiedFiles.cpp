@@ -9,6 +9,7 @@
 #include <sys/stat.h>
 
 #include "error/errorUtil/GitResult.hpp"
+#include "util/repository/objectIds.hpp"
 
 namespace vclink::git
 {

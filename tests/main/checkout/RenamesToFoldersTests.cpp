@@ -34,6 +34,11 @@ class RenamesToFolders : public ObstacleFixture
                                    "' is a renamed file of one side and a folder of "
                                    "the other: merge with 'git merge'"));
     }
+    void expectInsideRefused() const
+    {
+        expectMergeRefused(refusal("'file/inside' is a renamed file of one side, in a folder that "
+                                   "is a changed file of the other: merge with 'git merge'"));
+    }
 };
 
 TEST_F(RenamesToFolders, RefuseTheMergeIfTheyAreTheirs)
@@ -49,6 +54,20 @@ TEST_F(RenamesToFolders, RefuseTheMergeIfTheyAreOurs)
 {
     diverge(moves("old", "new"), writes("new/deep/inside", "theirs\n"));
     expectNameRefused("new");
+}
+
+TEST_F(RenamesToFolders, RefuseTheMergeIfTheirFolderIsAFileThatWeChanged)
+{
+    diverge(writes("file", "ours\n"),
+            removes("file") + makesFolder("file") + moves("old", "file/inside"));
+    expectInsideRefused();
+}
+
+TEST_F(RenamesToFolders, RefuseTheMergeIfOurFolderIsAFileThatTheyChanged)
+{
+    diverge(removes("file") + makesFolder("file") + moves("old", "file/inside"),
+            writes("file", "theirs\n"));
+    expectInsideRefused();
 }
 
 /// libgit2 would leave both files out of the merge.

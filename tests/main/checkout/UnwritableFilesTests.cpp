@@ -140,6 +140,19 @@ TEST_F(UnwritableFiles, AreRestoredByARevert)
     expectMode("d/r", 0644);
 }
 
+TEST_F(UnwritableFiles, ThatAreMissingInSuchAFolderStopARevertBeforeItWrites)
+{
+    repository_.write("a", "mine\n");
+    repository_.remove("d/r");
+    const auto revert = [this]
+    {
+        const std::vector<upath> files{asPath((repository_ / "a").string()),
+                                       asPath((repository_ / "d/r").string())};
+        return failureOf([&] { adapter_->revertFiles(files); }).text;
+    };
+    EXPECT_EQ(runUnprivileged("d", 0555, revert), "the file 'd/r' cannot be created in its folder");
+}
+
 TEST_F(UnwritableFiles, KeepThePermissionToExecute)
 {
     repository_.setMode("d/r", 0755);
