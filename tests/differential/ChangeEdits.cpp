@@ -76,7 +76,15 @@ void ChangeSequence::changeType(const std::string &path)
     {
         return write(path, makeContent(random_));
     }
-    const std::string target = makeLinkTarget();
+    link(path);
+}
+
+/// Never to itself: what such a link means cannot be asked.
+void ChangeSequence::link(const std::string &path)
+{
+    const std::string made = makeLinkTarget();
+    const bool isItself = path.substr(path.rfind('/') + 1) == made;
+    const std::string target = isItself ? "missing" : made;
     twins_.edit([&](WorkingCopyMaker &maker) { maker.link(target, path); });
 }
 
@@ -115,8 +123,7 @@ void ChangeSequence::addUntracked()
     made_.push_back(path);
     if (random_.chance(10))
     {
-        const std::string target = makeLinkTarget();
-        return twins_.edit([&](WorkingCopyMaker &maker) { maker.link(target, path); });
+        return link(path);
     }
     write(path, makeContent(random_));
 }

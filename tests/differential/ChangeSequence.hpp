@@ -56,6 +56,7 @@ class ChangeSequence
     void edit();
     void editFile(const std::string &path);
     void changeType(const std::string &path);
+    void link(const std::string &path);
     void replaceByFolder(const std::string &path);
     void replaceByFile(const std::string &folder);
     void addUntracked();
