@@ -46,13 +46,16 @@ class AddCommand : public Command
 
     ExitStatus run(Session &session) override
     {
-        CMAdapter &adapter = session.adapter();
+        CMAdapter &adapter = session.workingCopy();
         const upath &root = adapter.getRootFolder();
         const std::vector<NamedPath> paths =
             lookUp(adapter, addsAll_ ? std::vector<std::string>{nativePath(root).string()}
                                      : paths_->results());
-        refuseUnless(say("Nothing was added"), paths,
-                     [&root](const NamedPath &named) { return explain(root, named); });
+        if (!addsAll_)
+        {
+            refuseUnless(say("Nothing was added"), paths,
+                         [&root](const NamedPath &named) { return explain(root, named); });
+        }
         FileStateMap files;
         FileStateMap removed;
         for (const NamedPath &named : paths)
@@ -66,7 +69,7 @@ class AddCommand : public Command
             files.merge(chosen);
             removed.merge(back);
         }
-        const std::vector<upath> list = addressable(filterFollowed(files, root, false), root);
+        const std::vector<upath> list = addable(files, root);
         refuseStrays(say("Nothing was added"), adapter, paths, list,
                      [](FileState::State state) { return isNew(state) || isInConflict(state); });
         const ExitStatus status = runStoppable(session, Stops::Never,
@@ -84,15 +87,27 @@ class AddCommand : public Command
         }
         files.merge(removed);
         const FileStateMap leftOut = findLeftOut(adapter, files, isNew);
-        remark(files.empty() ? say("There is no new file to add.")
-                             : say("Added %1%.", countFiles(files.size() - leftOut.size())));
-        return tellLeftOut(say("Others were not added"), root, leftOut);
+        const std::size_t count = files.size() - leftOut.size();
+        if (count != 0 || leftOut.empty())
+        {
+            remark(count == 0 ? say("There is no new file to add.")
+                              : say("Added %1%.", countFiles(count)));
+        }
+        return tellLeftOut(count == 0 ? say("Nothing was added") : say("Others were not added"),
+                           root, leftOut);
     }
 
   private:
     static bool isNew(FileState::State state)
     {
         return state == FileState::Unversioned;
+    }
+
+    static std::vector<upath> addable(const FileStateMap &files, const upath &root)
+    {
+        std::vector<upath> list = addressable(filterFollowed(files, root, false), root);
+        list.erase(std::remove_if(list.begin(), list.end(), isRepository), list.end());
+        return list;
     }
 
     /// The back end also names tracked files below a folder in whose place a new file is.
@@ -119,6 +134,10 @@ class AddCommand : public Command
         if (named.states.empty())
         {
             return explainAbsence(root, named);
+        }
+        if (named.states.size() == 1 && isRepository(named.states.begin()->first))
+        {
+            return say("it is a repository of its own: use \"%1%\"", "git submodule add");
         }
         const std::string reason = explainLink(named, "git add");
         const auto own = named.states.find(named.path);

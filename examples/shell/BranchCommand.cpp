@@ -7,6 +7,7 @@
 #include "PushRefspec.hpp"
 #include "Session.hpp"
 #include "arguments.hpp"
+#include "checkedOutBranches.hpp"
 #include "commands.hpp"
 #include "failures.hpp"
 #include "gitProgram.hpp"
@@ -16,6 +17,7 @@
 #include "runStoppable.hpp"
 #include "suggestions.hpp"
 #include "texts.hpp"
+#include "unfinished.hpp"
 #include "vclink/git/BranchManager.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
 
@@ -24,15 +26,17 @@ namespace vclink::shell
 namespace
 {
 
-/// Whether a text means a commit, and is not the name of a reference.
+/// Whether a text means a commit, and is not the name of a reference to one.
 bool isUnnamedCommit(const git::BranchManager &manager, const std::string &text)
 {
-    const auto exists = [&](const char *folder) { return findRevision(manager, folder + text); };
+    const std::optional<std::string> commit = findRevision(manager, text + "^{commit}");
+    const auto isOf = [&](const char *folder)
+    { return findRevision(manager, folder + text) == commit; };
     // No name of a reference has these.
-    const bool isNamed = text.find_first_of("~^:") == std::string::npos &&
-                         (text == "HEAD" || exists("refs/heads/") || exists("refs/tags/") ||
-                          exists("refs/remotes/"));
-    return !isNamed && findRevision(manager, text + "^{commit}");
+    const bool isNamed =
+        text.find_first_of("~^:") == std::string::npos &&
+        (text == "HEAD" || isOf("refs/heads/") || isOf("refs/tags/") || isOf("refs/remotes/"));
+    return commit && !isNamed;
 }
 
 /// @throws ShellFailure if a branch is in the way of the new one
@@ -100,7 +104,7 @@ class BranchCommand : public Command
         const std::string tip = findRevision(*manager, "refs/heads/" + name).value_or("");
         if (deletes_)
         {
-            refuseToDelete(*manager, name);
+            refuseToDelete(session.adapter(), *manager, name);
         }
         const bool mayLoseCommits = deletes_ && !isMerged(session.adapter(), tip);
         try
@@ -128,16 +132,16 @@ class BranchCommand : public Command
                 explainName(name, failure);
                 throw;
             }
-            reportFailure();
-            complain(say("START must be the name of a branch or a tag. For any other commit, use "
-                         "\"git branch %1% %2%\".",
-                         name, start()));
-            return Failed;
+            throw ShellFailure(
+                say("No branch was made: START must be the name of a branch, or of a tag that is "
+                    "not annotated. For any\nother commit, use \"git branch %1% %2%\".",
+                    quoteForShell(name), quoteForShell(start())));
         }
     }
 
   private:
-    static void refuseToDelete(const git::BranchManager &manager, const std::string &name)
+    static void refuseToDelete(CMAdapter &adapter, const git::BranchManager &manager,
+                               const std::string &name)
     {
         if (!isBranch(manager, name))
         {
@@ -149,6 +153,30 @@ class BranchCommand : public Command
             throw ShellFailure(say("Nothing was deleted: '%1%' is the current branch. Switch to "
                                    "another one first.",
                                    showName(name)));
+        }
+        refuseNeeded(adapter, name);
+    }
+
+    /// @throws ShellFailure if a working copy has the branch checked out, or returns to it
+    static void refuseNeeded(CMAdapter &adapter, const std::string &name)
+    {
+        for (const CheckedOutBranch &branch :
+             findCheckedOutBranches(nativePath(adapter.getRootFolder())))
+        {
+            const bool isMeant = branch.name == name;
+            const std::string unfinished =
+                isMeant && branch.isOwn ? describeUnfinished(adapter) : std::string();
+            if (!unfinished.empty())
+            {
+                throw ShellFailure(say("Nothing was deleted. %1%", unfinished));
+            }
+            if (isMeant && !branch.isOwn)
+            {
+                throw ShellFailure(
+                    say("Nothing was deleted: '%1%' is checked out in the working copy %2%.\n"
+                        "Switch to another branch there first.",
+                        showName(name), quoteName(makePath(branch.root).string())));
+            }
         }
     }
 

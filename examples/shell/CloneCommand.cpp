@@ -13,20 +13,15 @@
 #include "failures.hpp"
 #include "fl/i18n/convert.hpp"
 #include "names.hpp"
+#include "remotes.hpp"
 #include "runWithRemote.hpp"
 #include "texts.hpp"
+#include "vclink/git/LibGit2Exception.hpp"
 
 namespace vclink::shell
 {
 namespace
 {
-
-/// As git reads an address: a colon before the first slash ends a scheme or a host.
-bool isPath(const std::string &argument)
-{
-    const std::size_t colon = argument.find(':');
-    return colon == std::string::npos || argument.find('/') < colon;
-}
 
 /// The address of what exists on this machine is made absolute, as by git: the clone remembers it,
 /// and is used from other folders.
@@ -66,6 +61,78 @@ std::string nameFor(std::string specifier)
     return name;
 }
 
+bool isEmptyFolder(const std::filesystem::path &folder)
+{
+    std::error_code ignored;
+    return std::filesystem::is_directory(folder, ignored) &&
+           std::filesystem::is_empty(folder, ignored);
+}
+
+/// @throws ShellFailure if something is in the way
+void refuseTaken(const std::filesystem::path &folder)
+{
+    std::error_code ignored;
+    if (std::filesystem::exists(std::filesystem::symlink_status(folder, ignored)) &&
+        !isEmptyFolder(folder))
+    {
+        throw ShellFailure(say("Nothing was cloned: %1% exists, and is not an empty folder.",
+                               showPath(makePath(folder))));
+    }
+}
+
+/// libgit2 leaves what it has made if it can't even set up the repository, e.g. on a full disk, and
+/// very deep folders.
+/// @param wasThere whether the folder was there before, which was empty then
+void removeUnfinished(const std::filesystem::path &folder, bool wasThere)
+{
+    std::error_code error;
+    if (wasThere)
+    {
+        for (const auto &entry : std::filesystem::directory_iterator(folder, error))
+        {
+            std::filesystem::remove_all(entry.path(), error);
+        }
+    }
+    else
+    {
+        std::filesystem::remove_all(folder, error);
+    }
+    std::error_code ignored;
+    const bool isLeft =
+        wasThere ? !isEmptyFolder(folder)
+                 : std::filesystem::exists(std::filesystem::symlink_status(folder, ignored));
+    if (isLeft)
+    {
+        complain(say("%1% is unfinished, and can't be removed: %2%. Remove it yourself.",
+                     showPath(makePath(folder)), error.message()));
+    }
+}
+
+void generate(WorkingCopyGenerator &generator, const ustring &specifier,
+              const std::filesystem::path &folder)
+{
+    constexpr int isTaken = -4; // GIT_EEXISTS
+    const bool wasThere = isEmptyFolder(folder);
+    try
+    {
+        generator.generate(specifier, makePath(folder));
+    }
+    catch (const git::LibGit2Exception &failure)
+    {
+        // What came there since refuseTaken() is somebody else's.
+        if (failure.getError().getCode() != isTaken)
+        {
+            removeUnfinished(folder, wasThere);
+        }
+        throw;
+    }
+    catch (...)
+    {
+        removeUnfinished(folder, wasThere);
+        throw;
+    }
+}
+
 class CloneCommand : public Command
 {
   public:
@@ -90,13 +157,14 @@ class CloneCommand : public Command
         const ustring specifier = readSpecifier(argument);
         const std::filesystem::path folder =
             resolveArgument(folder_->empty() ? nameFor(argument) : folder_->results().front());
+        refuseTaken(folder);
         const auto generator = session.factory().createWorkingCopyGenerator(session.interactor());
         const std::string text = say("Cloning into %1%:", quoteName(makePath(folder).string()));
         remark(text);
         RemoteNotes notes;
         const ExitStatus status =
             runStoppableWithRemote(session, Stops::BeforeWriting, text, notes,
-                                   [&] { generator->generate(specifier, makePath(folder)); });
+                                   [&] { generate(*generator, specifier, folder); });
         if (status == Done)
         {
             remark(say("Done."));

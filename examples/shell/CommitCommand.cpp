@@ -89,7 +89,7 @@ class CommitCommand : public Command
 
     ExitStatus run(Session &session) override
     {
-        CMAdapter &adapter = session.adapter();
+        CMAdapter &adapter = session.workingCopy();
         const upath &root = adapter.getRootFolder();
         const FileStateMap states = takesAll_ ? folderStates(adapter, root) : wholeStates(adapter);
         const std::string &message = message_->results().front();
@@ -167,9 +167,8 @@ class CommitCommand : public Command
                               const auto now = after.find(entry.first);
                               return now != after.end() && isChanged(now->second.getState());
                           });
-        return states.empty() ? say("Committed.")
-                              : say("Committed %1%.",
-                                    countFiles(changed.size() - static_cast<std::size_t>(left)));
+        const std::size_t count = changed.size() - static_cast<std::size_t>(left);
+        return count == 0 ? say("Committed.") : say("Committed %1%.", countFiles(count));
     }
 
     const CLI::Option *message_ = nullptr;

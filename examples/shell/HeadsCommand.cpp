@@ -35,7 +35,7 @@ class HeadsCommand : public Command
     ExitStatus run(Session &session) override
     {
         const std::string name = chooseRemote(session, *remote_, Direction::Here);
-        const auto remote = openRemote(session, name);
+        const auto remote = openRemote(session, name, Direction::Here);
         RemoteNotes notes;
         std::vector<git::GitRemoteHead> heads;
         const ExitStatus status = runWithRemote(session, say("Asking %1%:", name), notes,

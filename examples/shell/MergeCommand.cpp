@@ -12,6 +12,8 @@
 #include "arguments.hpp"
 #include "commands.hpp"
 #include "failures.hpp"
+#include "fl/i18n/convert.hpp"
+#include "foundation/core/except/IUserException.hpp"
 #include "mergeReport.hpp"
 #include "names.hpp"
 #include "revisions.hpp"
@@ -44,13 +46,13 @@ class MergeCommand : public Command
                         "After conflicts the status is 1. Resolve each file, mark it with "
                         "resolved, and conclude the merge\nwith commit; or undo the merge with "
                         "\"git merge --abort\".\n\n"
-                        "Ctrl-C stops it until the first file is written: nothing has changed "
+                        "Until the first file is written, Ctrl-C stops it: nothing has changed "
                         "then."));
     }
 
     ExitStatus run(Session &session) override
     {
-        const auto manager = git::BranchManager::create(session.adapter());
+        const auto manager = git::BranchManager::create(session.workingCopy());
         const std::string name = name_->results().front();
         const std::optional<std::string> before = findRevision(*manager, "HEAD");
         const std::optional<std::string> theirs = findRevision(*manager, name);
@@ -92,6 +94,12 @@ class MergeCommand : public Command
             const MergeLog log(notes);
             return runStoppable(session, Stops::BeforeWriting,
                                 [&manager, &name] { manager.merge(name); });
+        }
+        catch (const foundation::core::except::IUserException &failure)
+        {
+            notes.text = fl::i18n::ustring_to_utf8(failure.GetUnicodeMessageTxt());
+            session.progressLine().clear();
+            return reportFailure();
         }
         catch (...)
         {

@@ -15,6 +15,8 @@ struct MergeNotes
 {
     /// libgit2's code of the last failure; 0 if there was none
     int failure = 0;
+    /// the text of the exception that ended the merge; empty if none did
+    std::string text;
     /// the driver whose command ran last, and the command
     std::string driver;
     std::string command;

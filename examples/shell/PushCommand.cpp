@@ -15,6 +15,7 @@
 #include "fl/i18n/convert.hpp"
 #include "gitProgram.hpp"
 #include "names.hpp"
+#include "refspecPatterns.hpp"
 #include "remotes.hpp"
 #include "revisions.hpp"
 #include "runWithRemote.hpp"
@@ -45,29 +46,34 @@ class PushCommand : public Command
     ExitStatus run(Session &session) override
     {
         const std::string name = chooseRemote(session, *remote_, Direction::There);
-        const bool isConfigured = refspecs_->empty() && isPushConfigured(session, name);
         const auto manager = git::BranchManager::create(session.adapter());
         const std::string branch = findCurrentBranch(*manager).value_or("");
-        const auto texts = isConfigured ? std::vector<std::string>() : chooseRefspecs(branch);
-        const auto remote = openRemote(session, name);
+        const auto configured = refspecs_->empty()
+                                    ? configuredRefspecs(session, name, Direction::There)
+                                    : std::vector<std::string>();
+        const auto chosen = configured.empty() ? chooseRefspecs(branch) : configured;
+        const auto remote = openRemote(session, name, Direction::There);
+        const auto askHeads = [&remote] { return remote->getRemoteHeads(); };
         std::vector<PushRefspec> refspecs;
         RemoteNotes notes;
         const ExitStatus status = runStoppableWithRemote(
             session, Stops::WhenServerTalks, say("Pushing to %1%:", name), notes,
             [&]
             {
+                const auto texts = configured.empty()
+                                       ? chosen
+                                       : expandPush(configured, listReferences(session), askHeads);
                 for (const std::string &text : texts)
                 {
-                    refspecs.push_back(readPushRefspec(
-                        *manager, text, branch, [&remote] { return remote->getRemoteHeads(); }));
+                    refspecs.push_back(readPushRefspec(*manager, text, branch, askHeads));
                 }
                 dropWhatIsThere(*manager, *remote, name, refspecs);
-                if (isConfigured || !refspecs.empty())
+                if (!refspecs.empty())
                 {
                     push(session, *remote, name, refspecs);
                 }
             });
-        return status == Done ? tell(notes, refspecs, name, isConfigured) : status;
+        return status == Done ? tell(notes, refspecs, name) : status;
     }
 
   private:
@@ -79,10 +85,18 @@ class PushCommand : public Command
         }
         if (branch.empty())
         {
-            throw ShellFailure(
-                say("Nothing was pushed: there is no current branch. Name what to push."));
+            throw ShellFailure(noCurrentBranch());
         }
         return {"refs/heads/" + branch};
+    }
+
+    static std::vector<std::string> listReferences(Session &session)
+    {
+        std::string text = runGit(nativePath(session.adapter().getRootFolder()),
+                                  {"for-each-ref", "--format=%(refname)"})
+                               .value_or("");
+        std::replace(text.begin(), text.end(), '\n', '\0');
+        return splitAtNul(text);
     }
 
     /// What the remote had when it was heard of last may be there still: only then it is asked.
@@ -180,7 +194,7 @@ class PushCommand : public Command
 
     /// The back end counts a push as done whatever the server made of it.
     static ExitStatus tell(const RemoteNotes &notes, const std::vector<PushRefspec> &refspecs,
-                           const std::string &remote, bool isConfigured)
+                           const std::string &remote)
     {
         std::string rejected;
         std::set<std::string> names;
@@ -208,8 +222,7 @@ class PushCommand : public Command
         }
         if (refspecs.empty())
         {
-            remark(isConfigured ? say("Pushed to %1%, as remote.%1%.push says.", remote)
-                                : say("Everything is up to date at %1%.", remote));
+            remark(say("Everything is up to date at %1%.", remote));
         }
         return Done;
     }

@@ -108,6 +108,12 @@ std::string PushRefspec::describe(const std::string &remote) const
                                   shortReference(target), remote);
 }
 
+std::string noCurrentBranch()
+{
+    return say("Nothing was pushed: there is no current branch. Name what to push, e.g. "
+               "HEAD:refs/heads/NAME.");
+}
+
 std::string shortReference(const std::string &name)
 {
     for (const std::string_view folder : {heads, tags})
@@ -129,6 +135,10 @@ PushRefspec readPushRefspec(const git::BranchManager &manager, const std::string
     const std::size_t colon = text.find(':');
     result.source = completeSource(manager, text.substr(0, colon), currentBranch);
     const bool isDetachedHead = result.source == "HEAD" && colon != std::string::npos;
+    if (result.source == "HEAD" && !isDetachedHead)
+    {
+        throw ShellFailure(noCurrentBranch());
+    }
     if (!result.source.empty() && !begins(result.source, "refs/") && !isDetachedHead)
     {
         throw ShellFailure(say("Nothing was pushed: there is no branch and no tag '%1%' here.",

@@ -24,6 +24,9 @@ struct PushRefspec
     std::string describe(const std::string &remote) const;
 };
 
+/// Why nothing is pushed if no branch is the current one.
+std::string noCurrentBranch();
+
 /// A full name as people know it: "main" for "refs/heads/main".
 std::string shortReference(const std::string &name);
 

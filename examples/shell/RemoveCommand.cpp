@@ -33,7 +33,7 @@ class RemoveCommand : public Command
 
     ExitStatus run(Session &session) override
     {
-        CMAdapter &adapter = session.adapter();
+        CMAdapter &adapter = session.workingCopy();
         const upath &root = adapter.getRootFolder();
         const std::vector<NamedPath> paths = lookUp(adapter, paths_->results());
         refuseUnless(say("Nothing was removed"), paths,
@@ -47,9 +47,13 @@ class RemoveCommand : public Command
             return status;
         }
         const FileStateMap leftOut = findLeftOut(adapter, removed.files, isRemovable);
-        remark(say("Removed %1% from Git, not from the disk.",
-                   countFiles(removed.files.size() - leftOut.size())));
-        return tellLeftOut(say("Not all were removed"), root, leftOut);
+        const std::size_t count = removed.files.size() - leftOut.size();
+        if (count != 0)
+        {
+            remark(say("Removed %1% from Git, not from the disk.", countFiles(count)));
+        }
+        return tellLeftOut(count == 0 ? say("Nothing was removed") : say("Not all were removed"),
+                           root, leftOut);
     }
 
   private:

@@ -39,7 +39,7 @@ class ResolvedCommand : public Command
 
     ExitStatus run(Session &session) override
     {
-        CMAdapter &adapter = session.adapter();
+        CMAdapter &adapter = session.workingCopy();
         const upath &root = adapter.getRootFolder();
         const std::vector<NamedPath> paths = lookUp(adapter, paths_->results());
         refuseUnless(say("Nothing was marked as resolved"), paths,

@@ -39,17 +39,17 @@ class RevertCommand : public Command
         paths_ = declarePaths(line, say("Tracked files, and folders: all tracked files below them"))
                      ->required();
         line.add_flag("--forget", forgets_, say("Keep no copy of what is discarded"));
-        line.footer(
-            say("Discards all changes to the files, staged or not: they become as in the last "
-                "commit. What is\ndiscarded is stored in the repository first, and the command "
-                "that restores it is printed. A file\nthat was only added becomes untracked, and "
-                "keeps its text.\n\nCtrl-C stops it until the first file is written. The files are "
-                "unchanged then, but staged changes\nmay be unstaged."));
+        line.footer(say(
+            "Discards all changes to the files, staged or not: they become as in the last "
+            "commit. What is\ndiscarded is stored in the repository first, and the command "
+            "that restores it is printed. A file\nthat was only added becomes untracked, and "
+            "keeps its text.\n\nUntil the first file is written, Ctrl-C stops it. The files are "
+            "unchanged then, but staged changes\nmay be unstaged."));
     }
 
     ExitStatus run(Session &session) override
     {
-        CMAdapter &adapter = session.adapter();
+        CMAdapter &adapter = session.workingCopy();
         const upath &root = adapter.getRootFolder();
         std::vector<NamedPath> paths = lookUp(adapter, paths_->results());
         addOverlooked(adapter, paths);
@@ -74,10 +74,14 @@ class RevertCommand : public Command
             return status;
         }
         const FileStateMap leftOut = findLeftOut(adapter, reverted.files, isChanged);
-        remark(reverted.files.empty()
-                   ? say("There is no change to revert.")
-                   : say("Reverted %1%.", countFiles(reverted.files.size() - leftOut.size())));
-        return tellLeftOut(say("Not all were reverted"), root, leftOut);
+        const std::size_t count = reverted.files.size() - leftOut.size();
+        if (count != 0 || leftOut.empty())
+        {
+            remark(count == 0 ? say("There is no change to revert.")
+                              : say("Reverted %1%.", countFiles(count)));
+        }
+        return tellLeftOut(count == 0 ? say("Nothing was reverted") : say("Not all were reverted"),
+                           root, leftOut);
     }
 
   private:

@@ -158,6 +158,19 @@ CMAdapter &Session::adapter()
     return *adapter_;
 }
 
+CMAdapter &Session::workingCopy()
+{
+    CMAdapter &found = adapter();
+    const std::filesystem::path root = nativePath(found.getRootFolder());
+    if (!hasGitEntry(root))
+    {
+        throw ShellFailure(
+            say("%1% is a bare repository, which has no files. Work in a clone of it.",
+                quoteName(makePath(root).string())));
+    }
+    return found;
+}
+
 const std::filesystem::path &Session::startFolder() const noexcept
 {
     return startFolder_;

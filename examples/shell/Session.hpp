@@ -41,6 +41,10 @@ class Session
     ///         working copy, and what the back end throws
     CMAdapter &adapter();
 
+    /// As adapter().
+    /// @throws ShellFailure also in a bare repository, which has no files
+    CMAdapter &workingCopy();
+
     /// The folder in which the program was started, before -C.
     const std::filesystem::path &startFolder() const noexcept;
 

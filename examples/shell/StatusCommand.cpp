@@ -7,6 +7,7 @@
 #include "arguments.hpp"
 #include "commands.hpp"
 #include "fl/i18n/convert.hpp"
+#include "links.hpp"
 #include "namedPaths.hpp"
 #include "names.hpp"
 #include "refusals.hpp"
@@ -49,13 +50,44 @@ std::string explain(const upath &root, const NamedPath &named, const FileStateMa
                : explainAbsence(root, {named.argument, isInside ? named.path : path, {}});
 }
 
+/// The states of what Git has under the names of symbolic links, not of what they lead to.
+FileStateMap collectLinks(CMAdapter &adapter, const std::vector<std::string> &arguments)
+{
+    FileStateMap states;
+    const std::vector<NamedPath> links = lookUp(adapter, arguments);
+    refuseUnless(say("Not every name is known"), links,
+                 [&adapter](const NamedPath &named)
+                 {
+                     std::error_code ignored;
+                     const bool isLink =
+                         std::filesystem::is_symlink(nativePath(named.path), ignored);
+                     return named.states.empty() && !isLink
+                                ? explainAbsence(adapter.getRootFolder(), named)
+                                : std::string();
+                 });
+    for (const NamedPath &named : links)
+    {
+        states.insert(named.states.begin(), named.states.end());
+    }
+    return states;
+}
+
 /// The states of what the person named. A folder is asked for by itself; all files go in one call.
 FileStateMap collectStates(CMAdapter &adapter, const std::vector<std::string> &arguments)
 {
-    FileStateMap states;
+    const upath &root = adapter.getRootFolder();
+    std::vector<std::string> links;
+    std::vector<std::string> notLinks;
+    for (const std::string &argument : arguments)
+    {
+        const upath entry = entryForm(resolveArgument(argument), root);
+        const bool isLink = liesIn(entry.string(), root.string()) && isFollowed(entry, root);
+        (isLink ? links : notLinks).push_back(argument);
+    }
+    FileStateMap states = collectLinks(adapter, links);
     std::vector<NamedPath> others;
     std::vector<upath> files;
-    for (NamedPath &named : lookUpFolders(adapter, arguments))
+    for (NamedPath &named : lookUpFolders(adapter, notLinks))
     {
         if (named.states.empty())
         {
@@ -70,8 +102,7 @@ FileStateMap collectStates(CMAdapter &adapter, const std::vector<std::string> &a
         refuseUnknownStates(adapter);
     }
     refuseUnless(say("Not every name is known"), others,
-                 [&](const NamedPath &named)
-                 { return explain(adapter.getRootFolder(), named, single); });
+                 [&](const NamedPath &named) { return explain(root, named, single); });
     states.merge(single);
     return states;
 }
@@ -90,7 +121,7 @@ class StatusCommand : public Command
 
     ExitStatus run(Session &session) override
     {
-        CMAdapter &adapter = session.adapter();
+        CMAdapter &adapter = session.workingCopy();
         const upath &root = adapter.getRootFolder();
         const FileStateMap states = paths_->empty() ? folderStates(adapter, root)
                                                     : collectStates(adapter, paths_->results());

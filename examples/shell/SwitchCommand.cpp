@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: MIT
+#include <algorithm>
 #include <optional>
 #include <string>
 
@@ -8,8 +9,10 @@
 #include "ProgressLine.hpp"
 #include "Session.hpp"
 #include "arguments.hpp"
+#include "checkedOutBranches.hpp"
 #include "commands.hpp"
 #include "failures.hpp"
+#include "gitProgram.hpp"
 #include "mergeReport.hpp"
 #include "names.hpp"
 #include "revisions.hpp"
@@ -39,23 +42,52 @@ void refuseOtherFiles(const git::BranchManager &manager, const std::string &name
     }
 }
 
+/// @throws ShellFailure if another working copy of the repository has the branch checked out
+void refuseCheckedOut(CMAdapter &adapter, const std::string &name)
+{
+    const auto other = findOtherWorkingCopy(nativePath(adapter.getRootFolder()), name);
+    if (other)
+    {
+        throw ShellFailure(say("Nothing was switched: '%1%' is checked out in the working copy "
+                               "%2%.\nWork there, or switch to another branch there first.",
+                               showName(name), quoteName(makePath(*other).string())));
+    }
+}
+
+/// The branch that was the current one before, as git reads it from the log of HEAD.
+/// @throws ShellFailure if there was none
+std::string findPrevious(CMAdapter &adapter)
+{
+    std::string name =
+        runGit(nativePath(adapter.getRootFolder()), {"rev-parse", "--abbrev-ref", "@{-1}"})
+            .value_or("");
+    name.erase(std::min(name.find('\n'), name.size()));
+    if (name.empty())
+    {
+        throw ShellFailure(say("There was no other current branch before."));
+    }
+    return name;
+}
+
 class SwitchCommand : public Command
 {
   public:
     void declare(CLI::App &line) override
     {
-        name_ = declareName(line, "NAME", say("A local branch"))->required();
+        name_ =
+            declareName(line, "NAME", say("A local branch, or - for the previous one"))->required();
         line.footer(say(
             "Makes the branch the current one, and writes its files. Uncommitted changes to a file "
             "are kept if\nthe file is the same in both branches; otherwise switch refuses. Ignored "
-            "files that the branch\ntracks are overwritten without a copy.\n\nCtrl-C stops it "
-            "until the first file is written: nothing has changed then."));
+            "files that the branch\ntracks are overwritten without a copy.\n\nUntil the first "
+            "file is written, Ctrl-C stops it: nothing has changed then."));
     }
 
     ExitStatus run(Session &session) override
     {
-        const auto manager = git::BranchManager::create(session.adapter());
-        const std::string name = name_->results().front();
+        const auto manager = git::BranchManager::create(session.workingCopy());
+        const std::string argument = name_->results().front();
+        const std::string name = argument == "-" ? findPrevious(session.adapter()) : argument;
         if (!isBranch(*manager, name))
         {
             const bool isCommit = findRevision(*manager, name + "^{commit}").has_value();
@@ -65,6 +97,7 @@ class SwitchCommand : public Command
                           : suggestBranch(*manager, name)));
         }
         refuseOtherFiles(*manager, name);
+        refuseCheckedOut(session.adapter(), name);
         const ExitStatus status = switchTo(session, *manager, name);
         if (status == Done)
         {
@@ -90,9 +123,8 @@ class SwitchCommand : public Command
                 throw;
             }
             session.progressLine().clear();
-            const ExitStatus status = reportFailure();
-            tellSwitchObstacles(session.adapter(), manager, name);
-            return status;
+            refuseForObstacles(session.adapter(), manager, name);
+            throw;
         }
     }
 

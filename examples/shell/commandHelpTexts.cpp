@@ -71,7 +71,7 @@ constexpr Translation commandHelpRows[] = {
      "ピーの\nリモート \"origin\" になります。\n\n入力は求めません。鍵は ssh "
      "エージェントから、パスワードはアドレスからのみ取得します。\n証明書とホスト鍵はすべて受け入れ"
      "ます。"},
-    {"What the commit says", "Was der Commit sagt", "コミットメッセージ"},
+    {"What the commit says", "Die Nachricht des Commits", "コミットメッセージ"},
     {"Has no effect: a commit takes all changes anyway",
      "Ändert nichts: Ein Commit nimmt ohnehin alle Änderungen",
      "何も変わりません (コミットは常にすべての変更を含みます)"},
@@ -82,7 +82,7 @@ constexpr Translation commandHelpRows[] = {
     {"Commit files in conflict as they are, conflict markers included; commit also\nduring a "
      "rebase, a bisection or a series of picked commits, which ends it",
      "Dateien in Konflikt committen, wie sie sind, samt Markierungen, und\nauch mitten in einem "
-     "Rebase, einer Bisection oder einer Reihe von\nCommits, was sie beendet",
+     "Rebase, einer Bisection oder einer Reihe von\nCherry-Picks, was sie beendet",
      "競合しているファイルをマーカーも含めてそのままコミットする。リベース、\n二分探索、連続したチ"
      "ェリーピックの途中でも行い、それを終わらせる"},
     {"Commits all changes to tracked files, staged or not, and all that was added or removed. "
@@ -142,14 +142,14 @@ constexpr Translation commandHelpRows[] = {
     {"Brings the changes of another branch into the current one: by a fast-forward or a merge "
      "commit.\nRefuses to lose uncommitted changes or untracked files.\n\nAfter conflicts the "
      "status is 1. Resolve each file, mark it with resolved, and conclude the merge\nwith commit; "
-     "or undo the merge with \"git merge --abort\".\n\nCtrl-C stops it until the first file is "
-     "written: nothing has changed then.",
+     "or undo the merge with \"git merge --abort\".\n\nUntil the first file is written, Ctrl-C "
+     "stops it: nothing has changed then.",
      "Bringt die Änderungen eines anderen Branch in den aktuellen: durch einen Fast-Forward oder "
      "einen\nMerge-Commit. Weigert sich, Änderungen ohne Commit oder unversionierte Dateien zu "
-     "verlieren.\n\nNach Konflikten ist der Status 1. Lösen Sie jede Datei, markieren Sie sie mit "
-     "resolved und schließen\nSie den Merge mit commit ab; oder nehmen Sie ihn mit \"git merge "
-     "--abort\" zurück.\n\nStrg-C hält an, bis die erste Datei geschrieben wird: Dann ist nichts "
-     "geändert.",
+     "verlieren.\n\nNach Konflikten ist der Status 1. Lösen Sie die Konflikte jeder Datei, "
+     "markieren Sie sie mit resolved und schließen\nSie den Merge mit commit ab; oder nehmen Sie "
+     "ihn mit \"git merge --abort\" zurück.\n\nSolange keine Datei geschrieben ist, bricht Strg-C "
+     "ab: Dann ist nichts geändert.",
      "別のブランチの変更を、早送りまたはマージコミットで現在のブランチに取り込みます。未コミットの"
      "変更や\n追跡されていないファイルが失われる場合は拒否します。\n\n競合すると終了ステータスは 1 "
      "です。各ファイルを解決し、resolved で解決済みにして、commit "
@@ -200,13 +200,13 @@ constexpr Translation commandHelpRows[] = {
      "破棄する内容を保存しない"},
     {"Discards all changes to the files, staged or not: they become as in the last commit. What "
      "is\ndiscarded is stored in the repository first, and the command that restores it is "
-     "printed. A file\nthat was only added becomes untracked, and keeps its text.\n\nCtrl-C stops "
-     "it until the first file is written. The files are unchanged then, but staged changes\nmay be "
-     "unstaged.",
+     "printed. A file\nthat was only added becomes untracked, and keeps its text.\n\nUntil the "
+     "first file is written, Ctrl-C stops it. The files are unchanged then, but staged "
+     "changes\nmay be unstaged.",
      "Verwirft alle Änderungen an den Dateien, vorgemerkt oder nicht: Sie werden wie im letzten "
      "Commit. Was\nverworfen wird, bleibt als Git-Objekt erhalten, und eine Zeile sagt, wie es "
      "zurückkommt. Eine nur\nhinzugefügte Datei wird unversioniert und behält ihren "
-     "Text.\n\nStrg-C hält an, bis die erste Datei geschrieben wird: Dann sind die Dateien wie "
+     "Text.\n\nSolange keine Datei geschrieben ist, bricht Strg-C ab: Dann sind die Dateien wie "
      "zuvor; Vorgemerktes\nkann seine Vormerkung verloren haben.",
      "ファイルのすべての変更を、ステージの有無にかかわらず破棄し、最後のコミットの状態に戻します。"
      "破棄した\n内容は Git のオブジェクトとして保存され、復元方法が 1 "
@@ -225,7 +225,7 @@ constexpr Translation commandHelpRows[] = {
      "は、競合しているファイルがなくても、マージ、\nリバート、チェリーピックのいずれかです。"},
     {"One line for each file that is not clean: its state, a tab, and its path from the current "
      "folder.\nIgnored files are left out. The states:",
-     "Eine Zeile je Datei, die nicht unverändert ist: Zustand, Tabulator und der Pfad vom "
+     "Eine Zeile je geänderter oder unbekannter Datei: Zustand, Tabulator und der Pfad vom "
      "aktuellen Ordner.\nIgnorierte Dateien bleiben weg. Die Zustände:",
      "変更のあるファイルごとに 1 "
      "行、状態、タブ、現在のフォルダーからのパスを表示します。無視されるファイルは\n除かれます。状"
@@ -237,15 +237,16 @@ constexpr Translation commandHelpRows[] = {
     {"Only these files, and all files below these folders",
      "Nur diese Dateien und alle Dateien in diesen Ordnern",
      "これらのファイルと、これらのフォルダー内のすべてのファイルだけ"},
-    {"A local branch", "Ein lokaler Branch", "ローカルブランチ"},
+    {"A local branch, or - for the previous one", "Ein lokaler Branch, oder - für den vorigen",
+     "ローカルブランチ。- は一つ前のブランチ"},
     {"Makes the branch the current one, and writes its files. Uncommitted changes to a file are "
      "kept if\nthe file is the same in both branches; otherwise switch refuses. Ignored files that "
-     "the branch\ntracks are overwritten without a copy.\n\nCtrl-C stops it until the first file "
-     "is written: nothing has changed then.",
+     "the branch\ntracks are overwritten without a copy.\n\nUntil the first file is written, "
+     "Ctrl-C stops it: nothing has changed then.",
      "Macht den Branch zum aktuellen und schreibt seine Dateien. Änderungen ohne Commit an einer "
      "Datei\nbleiben, wenn die Datei in beiden Branches gleich ist; sonst wird nicht gewechselt. "
-     "Ignorierte\nDateien, die der Branch kennt, werden ohne Kopie überschrieben.\n\nStrg-C hält "
-     "an, bis die erste Datei geschrieben wird: Dann ist nichts geändert.",
+     "Ignorierte\nDateien, die der Branch kennt, werden ohne Kopie überschrieben.\n\nSolange keine "
+     "Datei geschrieben ist, bricht Strg-C ab: Dann ist nichts geändert.",
      "ブランチのファイルを書き出し、現在のブランチにします。両方のブランチで内容が同じファイルの未"
      "コミットの\n変更は残ります。そうでない場合は切り替えません。ブランチが追跡する、無視されるフ"
      "ァイルは上書きします。\n\nCtrl-C "

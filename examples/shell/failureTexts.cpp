@@ -26,20 +26,19 @@ constexpr Translation failureRows[] = {
      "discard\nthem there instead, put a plus before the branch: \"vclink-shell push REMOTE "
      "+BRANCH\".",
      "Holen Sie die Commits von dort mit \"vclink-shell fetch\", führen Sie sie zusammen, und "
-     "pushen "
-     "Sie noch\neinmal. Um sie dort zu verlieren, setzen Sie ein Plus vor den Branch: "
-     "\"vclink-shell push REMOTE +BRANCH\".",
+     "laden Sie noch einmal\nhoch. Um sie stattdessen dort zu verwerfen, setzen Sie ein Plus vor "
+     "den Branch:\n\"vclink-shell push REMOTE +BRANCH\".",
      "\"vclink-shell fetch\" "
-     "でリモートのコミットを取得し、マージしてからもう一度プッシュしてください。リモートの\nコミッ"
-     "ト"
-     "を失ってよい場合は、ブランチの前に + を付けてください: \"vclink-shell push REMOTE "
+     "でリモートのコミットを取得し、マージしてからもう一度送ってください。代わりにリモートの\nコミ"
+     "ットを破棄するには、ブランチの前に + を付けてください: \"vclink-shell push REMOTE "
      "+BRANCH\"。"},
     {"libgit2 does not know the format of this repository; core.repositoryformatversion and "
      "extensions in\n%1% describe it. If git can work here, use git.",
-     "Das Format steht in %1%, unter core.repositoryformatversion und extensions. Wenn git hier "
-     "arbeiten kann,\nbenutzen Sie git.",
-     "形式は %1% の core.repositoryformatversion と extensions にあります。git "
-     "が使える場合は、git を使ってください。"},
+     "libgit2 kennt das Format dieses Repositorys nicht; core.repositoryformatversion und "
+     "extensions in\n%1% beschreiben es. Wenn git hier arbeiten kann, benutzen Sie git.",
+     "libgit2 はこのリポジトリの形式に対応していません。形式は %1% "
+     "の\ncore.repositoryformatversion と extensions にあります。git が使える場合は、git "
+     "を使ってください。"},
     {"%1%.", "%1%.", "%1%。"},
     {"There is a branch '%1%' already. Choose another name, or use the branch that is "
      "there:\n\"vclink-shell switch %2%\".",
@@ -126,12 +125,12 @@ constexpr Translation failureRows[] = {
      "現在のブランチはありません。まだ何もコミットされていません。"},
     {"There is no branch '%1%'.", "Es gibt keinen Branch '%1%'.", "ブランチ '%1%' はありません。"},
     {"There is no branch and no commit '%1%'.", "Es gibt keinen Branch und keinen Commit '%1%'.",
-     "ブランチもコミットも '%1%' という名前ではありません。"},
+     "'%1%' というブランチもコミットもありません。"},
     {"Nothing was merged: there is no branch and no commit '%1%'.",
      "Nichts wurde zusammengeführt: Es gibt keinen Branch und keinen Commit '%1%'.",
-     "何もマージされませんでした。ブランチもコミットも '%1%' という名前ではありません。"},
+     "何もマージされませんでした。'%1%' というブランチもコミットもありません。"},
     {"Make it from %1% with \"vclink-shell branch %2% %1%\".",
-     "Machen Sie ihn aus %1%: \"vclink-shell branch %2% %1%\".",
+     "Legen Sie ihn aus %1% an: \"vclink-shell branch %2% %1%\".",
      "%1% から作るには \"vclink-shell branch %2% %1%\" を使ってください。"},
     {"Nothing was fetched: %1% has no reference '%2%'.",
      "Nichts wurde geholt: %1% hat keine Referenz '%2%'.",
@@ -186,8 +185,8 @@ constexpr Translation failureRows[] = {
      "のようにホストの前に付けてください。"},
     {"The server asked for a password. This program never sends one; it only uses the keys of an "
      "ssh agent.",
-     "Der Server verlangt ein Passwort, und es wird nie eines gesendet: Nur ein ssh-Agent wird "
-     "nach\nSchlüsseln gefragt.",
+     "Der Server verlangt ein Passwort. Dieses Programm sendet nie eines; es benutzt nur die "
+     "Schlüssel\neines ssh-Agenten.",
      "サーバーがパスワードを要求しましたが、パスワードは送りません。ssh "
      "エージェントの鍵だけを使います。"},
     {"The operation was cancelled.", "Der Vorgang wurde abgebrochen.",
@@ -205,10 +204,10 @@ constexpr Translation failureRows[] = {
      "現在のフォルダーが見つかりません: %1%。"},
     {"Standard output can't be written: %1%.",
      "Die Standardausgabe kann nicht geschrieben werden: %1%.", "標準出力に書き込めません: %1%。"},
-    {"The operation makes no progress.", "Von dem Vorgang war eine Weile nichts zu hören.",
-     "しばらく処理からの応答がありません。"},
+    {"The operation makes no progress.", "Der Vorgang kommt nicht voran.",
+     "処理が進んでいません。"},
     {"The operation can't be asked to stop: %1%.",
-     "Der Vorgang kann nicht gebeten werden aufzuhören: %1%.", "処理に中止を要求できません: %1%。"},
+     "Der Vorgang kann nicht abgebrochen werden: %1%.", "処理に中止を要求できません: %1%。"},
     {"This can't be cancelled. It goes on to its end.",
      "Das kann nicht abgebrochen werden. Es läuft zu Ende.",
      "これはキャンセルできません。最後まで実行します。"},

@@ -32,7 +32,7 @@ constexpr Translation helpRows[] = {
     {"\"vclink-shell help COMMAND\" describes a command.\n\nExit status: 0 done, 1 failed, 2 wrong "
      "usage, 128 plus a signal's number if that stopped it.",
      "\"vclink-shell help BEFEHL\" sagt mehr über einen Befehl.\n\nStatus: 0 erledigt, 1 "
-     "misslungen, 2 falscher Aufruf, 128 und die Nummer eines Signals abgebrochen.",
+     "misslungen, 2 falscher Aufruf, 128 plus die Nummer eines Signals, wenn es abbrach.",
      "\"vclink-shell help コマンド\" でコマンドの詳細を表示します。\n\n終了ステータス: 0 成功、1 "
      "失敗、2 使い方の誤り、128 + シグナル番号 中断。"},
     {"Work as if started in FOLDER", "Arbeiten, als wäre in FOLDER gestartet worden",
@@ -74,8 +74,7 @@ constexpr Translation helpRows[] = {
     {"See \"%1%\".", "Siehe \"%1%\".", "\"%1%\" を参照してください。"},
     {"must not be empty", "darf nicht leer sein", "空にはできません"},
     {"Show the state of files that are not clean",
-     "Die Zustände der Dateien zeigen, die nicht unverändert sind",
-     "変更のあるファイルの状態を表示する"},
+     "Den Zustand geänderter und unbekannter Dateien zeigen", "変更のあるファイルの状態を表示する"},
     {"Start tracking new files: they are in the next commit",
      "Neue Dateien aufnehmen: Sie sind im nächsten Commit",
      "新しいファイルの追跡を始める (次のコミットに入る)"},
@@ -125,7 +124,7 @@ constexpr Translation helpRows[] = {
      "このプログラムと libgit2 のバージョンを表示する"},
     {"Did you mean '%1%'?", "Meinten Sie '%1%'?", "'%1%' のことですか?"},
     {"This program does not do that, git does: use \"%1%\".",
-     "Das tut nicht dieses Programm, sondern git: Benutzen Sie \"%1%\".",
+     "Das kann nur git: Benutzen Sie \"%1%\".",
      "このプログラムにはない機能です。git を使ってください: \"%1%\"。"},
     {"Use \"%1%\".", "Benutzen Sie \"%1%\".", "\"%1%\" を使ってください。"},
 };

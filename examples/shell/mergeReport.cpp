@@ -120,9 +120,9 @@ void tellRefusal(CMAdapter &adapter, const MergeNotes &notes,
         complain(say("Nothing was merged. Commit the changes that would be lost, or move the files "
                      "out of the way, and\nmerge again."));
     }
-    else if (notes.failure == isLocked)
+    else if (notes.failure == isLocked || namesLock(adapter, notes.text))
     {
-        tellLocks(adapter);
+        tellLocks(adapter, notes.text);
     }
     else if (!notes.driver.empty() && !canBeStarted(word))
     {

@@ -14,7 +14,7 @@ constexpr Translation refusalRows[] = {
     {"a backslash in a name is read as a slash", "ein Backslash im Namen gilt als Schrägstrich",
      "名前の中のバックスラッシュはスラッシュとみなされます"},
     {"Git knows no file of this name", "Git kennt keine Datei dieses Namens",
-     "この名前のファイルは Git に知られていません"},
+     "この名前のファイルは Git の管理下にありません"},
     {"there is no such file", "es gibt keine solche Datei", "そのようなファイルはありません"},
     {"a name with *, ? or [ is read as a pattern", "*, ? und [ in einem Namen gelten als Muster",
      "名前の中の *、?、[ はパターンとみなされます"},
@@ -70,6 +70,7 @@ constexpr Translation refusalRows[] = {
     {"because a submodule keeps its commit until \"git submodule update\":",
      "weil ein Submodul seinen Commit bis zu \"git submodule update\" behält:",
      "サブモジュールは \"git submodule update\" までそのコミットのままです:"},
+    {"%1%, %2%%3%", "%1%, %2%%3%", "%1%。%2%%3%"},
     {"for an unknown reason:", "aus unbekanntem Grund:", "理由は不明です:"},
     {"A rebase is under way. Continue it with \"git rebase --continue\", or undo it with \"git "
      "rebase --abort\".",
@@ -129,19 +130,17 @@ constexpr Translation refusalRows[] = {
      "チェリーピックまたはリバートの途中です。\"vclink-shell commit\" で完了するか、\"git "
      "cherry-pick --abort\" または\n\"git revert --abort\" で取り消してください。"},
     {"These files have uncommitted changes, and differ on that branch:%1%",
-     "Diese Dateien haben Änderungen ohne Commit und sind auf dem Branch andere:%1%",
+     "Diese Dateien haben Änderungen ohne Commit und unterscheiden sich auf dem anderen Branch:%1%",
      "次のファイルには未コミットの変更があり、そのブランチでは内容が異なります:%1%"},
     {"These files are not tracked, and that branch has something in their place:%1%",
      "Diese Dateien kennt Git nicht, und der Branch hat etwas an ihrer Stelle:%1%",
      "次のファイルは追跡されておらず、そのブランチの同じ場所に何かがあります:%1%"},
     {"Nothing was switched. Commit the changes or revert them, move untracked files out of the "
-     "way, "
-     "and\nswitch again.",
+     "way, and\nswitch again.",
      "Es wurde nicht gewechselt. Committen oder verwerfen Sie die Änderungen, räumen Sie "
      "unversionierte\nDateien aus dem Weg, und wechseln Sie noch einmal.",
      "切り替えられませんでした。変更をコミットするか元に戻し、追跡されていないファイルを移してから"
-     "、"
-     "\nもう一度切り替えてください。"},
+     "、\nもう一度切り替えてください。"},
     {"These files have uncommitted changes:%1%", "Diese Dateien haben Änderungen ohne Commit:%1%",
      "次のファイルには未コミットの変更があります:%1%"},
     {"These files are not tracked, and the other side has something in their place:%1%",
@@ -254,6 +253,65 @@ constexpr Translation refusalRows[] = {
     {"Pushed %1% to %2%.", "%1% zu %2% hochgeladen.", "%1% を %2% に送りました。"},
     {"Pushed %1% to %2% at %3%.", "%1% zu %3% hochgeladen, dort %2%.",
      "%1% を %3% の %2% に送りました。"},
+    {"No branch was made: START must be the name of a branch, or of a tag that is not annotated. "
+     "For any\nother commit, use \"git branch %1% %2%\".",
+     "Kein Branch wurde angelegt: START muss der Name eines Branch oder eines nicht annotierten "
+     "Tags sein.\nFür jeden anderen Commit benutzen Sie \"git branch %1% %2%\".",
+     "ブランチは作成されませんでした。START "
+     "にはブランチか、注釈のないタグの名前を指定してください。\nほかのコミットには \"git branch "
+     "%1% %2%\" を使ってください。"},
+    {"Nothing was deleted. %1%", "Nichts wurde gelöscht. %1%", "何も削除されませんでした。%1%"},
+    {"Nothing was deleted: '%1%' is checked out in the working copy %2%.\nSwitch to another branch "
+     "there first.",
+     "Nichts wurde gelöscht: '%1%' ist in der Arbeitskopie %2% ausgecheckt.\nWechseln Sie dort "
+     "zuerst zu einem anderen Branch.",
+     "何も削除されませんでした。'%1%' は作業コピー %2% "
+     "でチェックアウトされています。\n先にそこで別のブランチに切り替えてください。"},
+    {"Nothing was switched. %1%", "Es wurde nicht gewechselt. %1%", "切り替えませんでした。%1%"},
+    {"Nothing was switched: '%1%' is checked out in the working copy %2%.\nWork there, or switch "
+     "to another branch there first.",
+     "Es wurde nicht gewechselt: '%1%' ist in der Arbeitskopie %2% ausgecheckt.\nArbeiten Sie "
+     "dort, oder wechseln Sie dort zuerst zu einem anderen Branch.",
+     "切り替えませんでした。'%1%' は作業コピー %2% "
+     "でチェックアウトされています。\nそこで作業するか、先にそこで別のブランチに切り替えてください"
+     "。"},
+    {"There was no other current branch before.", "Vorher gab es keinen anderen aktuellen Branch.",
+     "前に現在だった別のブランチはありません。"},
+    {"%1% is a bare repository, which has no files. Work in a clone of it.",
+     "%1% ist ein bloßes Repository ohne Dateien. Arbeiten Sie in einem Klon davon.",
+     "%1% はファイルのないベアリポジトリです。そのクローンで作業してください。"},
+    {"it is a repository of its own: use \"%1%\"",
+     "es ist ein eigenes Repository: Benutzen Sie \"%1%\"",
+     "独立したリポジトリです。\"%1%\" を使ってください"},
+    {"because these are repositories of their own:", "weil es eigene Repositorys sind:",
+     "独立したリポジトリです:"},
+    {"Nothing was cloned: %1% exists, and is not an empty folder.",
+     "Nichts wurde geklont: %1% gibt es schon, und es ist kein leerer Ordner.",
+     "何もクローンされませんでした。%1% は既にあり、空のフォルダーではありません。"},
+    {"%1% is unfinished, and can't be removed: %2%. Remove it yourself.",
+     "%1% ist unfertig und kann nicht entfernt werden: %2%. Entfernen Sie es selbst.",
+     "%1% は未完成ですが、削除できません: %2%。手動で削除してください。"},
+    {"Nothing was pushed: there is no current branch. Name what to push, e.g. "
+     "HEAD:refs/heads/NAME.",
+     "Nichts wurde hochgeladen: Es gibt keinen aktuellen Branch. Nennen Sie, was hochzuladen "
+     "ist,\nz. B. HEAD:refs/heads/NAME.",
+     "何も送られませんでした。現在のブランチがありません。HEAD:refs/heads/NAME "
+     "のように、送るものを\n指定してください。"},
+    {"Nothing was fetched: that would move the branch '%1%', which is checked out in %2%.\nFetch "
+     "into refs/remotes/%3%/ instead, and merge.",
+     "Nichts wurde geholt: Das würde den Branch '%1%' bewegen, der in %2% ausgecheckt ist.\nHolen "
+     "Sie stattdessen nach refs/remotes/%3%/, und führen Sie zusammen.",
+     "何も取得されませんでした。%2% でチェックアウトされているブランチ '%1%' "
+     "が動いてしまいます。\n代わりに refs/remotes/%3%/ に取得して、マージしてください。"},
+    {"To use an address, give it a name: \"%1%\".", "Geben Sie einer Adresse einen Namen: \"%1%\".",
+     "アドレスを使うには名前を付けてください: \"%1%\"。"},
+    {"'%1%' is a branch: name the remote before it, e.g. \"%2% %1%\".",
+     "'%1%' ist ein Branch: Nennen Sie davor das Remote, z. B. \"%2% %1%\".",
+     "'%1%' はブランチです。その前に \"%2% %1%\" のようにリモートを指定してください。"},
+    {"Remotes: %1%.", "Remotes: %1%.", "リモート: %1%。"},
+    {"There is no repository under the path of the remote '%1%', %2%: %3%.",
+     "Unter dem Pfad des Remotes '%1%', %2%, gibt es kein Repository: %3%.",
+     "リモート '%1%' のパス %2% にリポジトリがありません: %3%。"},
     {"Nothing was pushed: there is no branch and no tag '%1%' here.",
      "Nichts wurde hochgeladen: Hier gibt es keinen Branch und keinen Tag '%1%'.",
      "何も送られませんでした。ここにはブランチもタグも '%1%' がありません。"},

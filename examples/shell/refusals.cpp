@@ -105,6 +105,10 @@ std::string explainAbsence(const upath &root, const NamedPath &named)
     {
         return say("a name with *, ? or [ is read as a pattern");
     }
+    if (fs::is_directory(status) && path != nativePath(root) && hasGitEntry(path))
+    {
+        return say("it is a repository of its own: use \"%1%\"", "git submodule add");
+    }
     if (fs::is_directory(status))
     {
         return hasFiles(path) ? say("it has only ignored files") : say("it has no files");
@@ -158,6 +162,11 @@ std::string explainUntracked(const upath &root, const NamedPath &named)
     return {};
 }
 
+bool isRepository(const upath &entry)
+{
+    return entry.string().back() == u'/';
+}
+
 std::string explainLink(const NamedPath &named, const std::string &instead)
 {
     if (!named.isLink)
@@ -191,13 +200,15 @@ FileStateMap findLeftOut(CMAdapter &adapter, const FileStateMap &files,
 ExitStatus tellLeftOut(const std::string &refusal, const upath &root, const FileStateMap &leftOut)
 {
     // In the order in which they are told.
+    FileStateMap repositories;
     FileStateMap unnamable;
     FileStateMap followed;
     FileStateMap submodules;
     FileStateMap others;
     for (const auto &entry : leftOut)
     {
-        FileStateMap &files = !isAddressable(entry.first, root)      ? unnamable
+        FileStateMap &files = isRepository(entry.first)              ? repositories
+                              : !isAddressable(entry.first, root)    ? unnamable
                               : isFollowed(entry.first, root)        ? followed
                               : hasGitEntry(nativePath(entry.first)) ? submodules
                                                                      : others;
@@ -207,9 +218,10 @@ ExitStatus tellLeftOut(const std::string &refusal, const upath &root, const File
     {
         if (!files.empty())
         {
-            complain(refusal + ", " + reason + listNames(files));
+            complain(say("%1%, %2%%3%", refusal, reason, listNames(files)));
         }
     };
+    tell(say("because these are repositories of their own:"), repositories);
     tell(say("because a backslash in a name is read as a slash:"), unnamable);
     tell(say("because a symbolic link would be followed:"), followed);
     tell(say("because a submodule keeps its commit until \"git submodule update\":"), submodules);

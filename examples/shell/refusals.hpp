@@ -36,6 +36,9 @@ void refuseStrays(const std::string &refusal, CMAdapter &adapter,
                   const std::vector<NamedPath> &paths, const std::vector<upath> &list,
                   const std::function<bool(FileState::State)> &matters);
 
+/// Whether a file with a state is the folder of a repository that is not tracked.
+bool isRepository(const upath &entry);
+
 /// Why nothing that was named is tracked; an empty text where something is.
 std::string explainUntracked(const upath &root, const NamedPath &named);
 

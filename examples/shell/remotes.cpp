@@ -2,8 +2,10 @@
 #include "remotes.hpp"
 
 #include <algorithm>
+#include <cerrno>
 #include <filesystem>
 #include <map>
+#include <system_error>
 
 #include "Session.hpp"
 #include "arguments.hpp"
@@ -11,6 +13,7 @@
 #include "fl/i18n/convert.hpp"
 #include "gitProgram.hpp"
 #include "names.hpp"
+#include "revisions.hpp"
 #include "suggestions.hpp"
 #include "texts.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
@@ -43,22 +46,83 @@ std::vector<std::string> remotesOf(Session &session)
     return names;
 }
 
-/// Anything but a name is an address.
-/// @throws ShellFailure
+std::string joinNames(const std::vector<std::string> &names)
+{
+    std::string text;
+    for (const std::string &name : names)
+    {
+        text += (text.empty() ? "" : ", ") + showName(name);
+    }
+    return text;
+}
+
+/// What to say of a name that is none of the remotes.
+std::string adviseOnRemote(Session &session, const std::string &name,
+                           const std::vector<std::string> &known)
+{
+    const std::string word = showName(name);
+    if (name.find_first_of("/:") != std::string::npos)
+    {
+        return ' ' + say("To use an address, give it a name: \"%1%\".",
+                         "git remote add NAME " + quoteForShell(name));
+    }
+    if (known.empty())
+    {
+        return quoteForShell(name) == name
+                   ? ' ' + say("Add one with \"git remote add %1% ADDRESS\".", word)
+                   : std::string();
+    }
+    if (isBranch(*git::BranchManager::create(session.adapter()), name))
+    {
+        const bool hasOrigin = std::find(known.begin(), known.end(), "origin") != known.end();
+        return ' ' + say("'%1%' is a branch: name the remote before it, e.g. \"%2% %1%\".", word,
+                         hasOrigin ? "origin" : showName(known.front()));
+    }
+    const std::string suggestion = suggest(name, known);
+    return suggestion.empty() ? ' ' + say("Remotes: %1%.", joinNames(known)) : suggestion;
+}
+
+/// Without git it is unknown which remotes there are.
+/// @throws ShellFailure if there is no remote of this name
 void refuseUnknownRemote(Session &session, const std::string &name)
 {
     const std::vector<std::string> known = remotesOf(session);
-    if (name.find_first_of("/:") != std::string::npos ||
-        std::find(known.begin(), known.end(), name) != known.end() ||
-        settingsOf(session).count("remote." + name + ".pushurl") != 0)
+    const bool isKnown = std::find(known.begin(), known.end(), name) != known.end() ||
+                         settingsOf(session).count("remote." + name + ".pushurl") != 0;
+    if (!isKnown && runGit(nativePath(session.adapter().getRootFolder()), {"version"}))
     {
-        return;
+        throw ShellFailure(say("There is no remote '%1%'.", showName(name)) +
+                           adviseOnRemote(session, name, known));
     }
-    const std::string word = showName(name);
-    throw ShellFailure(say("There is no remote '%1%'.", word) +
-                       (known.empty() && quoteForShell(name) == name
-                            ? ' ' + say("Add one with \"git remote add %1% ADDRESS\".", word)
-                            : suggest(name, known)));
+}
+
+/// The address of a remote; empty if git does not know it.
+std::string addressOf(Session &session, const std::string &name, Direction direction)
+{
+    const auto root = nativePath(session.adapter().getRootFolder());
+    std::vector<std::string> words{"remote", "get-url"};
+    if (direction == Direction::There)
+    {
+        words.emplace_back("--push");
+    }
+    words.insert(words.end(), {"--", name});
+    std::string address = runGit(root, words).value_or("");
+    address.erase(std::min(address.find('\n'), address.size()));
+    return address;
+}
+
+/// libgit2 takes the path of nothing for an address of an unknown kind.
+/// @throws ShellFailure if the address of a remote is the path of nothing
+void refuseMissingPath(const std::string &address, const std::string &name)
+{
+    std::error_code error;
+    if (!address.empty() && isPath(address) && !std::filesystem::exists(address, error))
+    {
+        throw ShellFailure(
+            say("There is no repository under the path of the remote '%1%', %2%: %3%.",
+                showName(name), quoteName(fl::i18n::utf8_to_ustring(address)),
+                std::generic_category().message(error ? error.value() : ENOENT)));
+    }
 }
 
 } // namespace
@@ -94,20 +158,28 @@ std::string chooseRemote(Session &session, const CLI::Option &name, Direction di
             return found->second;
         }
     }
-    return "origin";
+    const std::vector<std::string> known = remotesOf(session);
+    return known.size() == 1 ? known.front() : "origin";
 }
 
-std::unique_ptr<git::GitRemote> openRemote(Session &session, const std::string &name)
+std::unique_ptr<git::GitRemote> openRemote(Session &session, const std::string &name,
+                                           Direction direction)
 {
     CMAdapter &adapter = session.adapter();
     refuseUnknownRemote(session, name);
     std::filesystem::current_path(nativePath(adapter.getRootFolder()));
+    refuseMissingPath(addressOf(session, name, direction), name);
     return git::GitRemote::create(name, adapter);
 }
 
-bool isPushConfigured(Session &session, const std::string &remote)
+std::vector<std::string> configuredRefspecs(Session &session, const std::string &remote,
+                                            Direction direction)
 {
-    return settingsOf(session).count("remote." + remote + ".push") != 0;
+    const std::string setting =
+        "remote." + remote + (direction == Direction::There ? ".push" : ".fetch");
+    return splitAtNul(runGit(nativePath(session.adapter().getRootFolder()),
+                             {"config", "-z", "--get-all", setting})
+                          .value_or(""));
 }
 
 std::optional<std::string> findCurrentBranch(const git::BranchManager &manager)
@@ -120,6 +192,12 @@ std::optional<std::string> findCurrentBranch(const git::BranchManager &manager)
     {
         return std::nullopt;
     }
+}
+
+bool isPath(const std::string &address)
+{
+    const std::size_t colon = address.find(':');
+    return colon == std::string::npos || address.find('/') < colon;
 }
 
 std::string hexadecimal(const git::GitRemoteHead::Id &id)

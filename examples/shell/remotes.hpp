@@ -28,18 +28,25 @@ enum class Direction
 CLI::Option *declareRemote(CLI::App &line);
 
 /// The remote that is named. Otherwise that of the current branch, as git's settings have it, or
-/// else "origin".
+/// else "origin", or the only one.
 std::string chooseRemote(Session &session, const CLI::Option &name, Direction direction);
 
 /// The remote of the adapter's working copy. Its relative addresses are read from the root, as by
 /// git, so that becomes the current folder.
-std::unique_ptr<git::GitRemote> openRemote(Session &session, const std::string &name);
+/// @throws ShellFailure if there is no remote of this name, or nothing under its path
+std::unique_ptr<git::GitRemote> openRemote(Session &session, const std::string &name,
+                                           Direction direction);
 
-/// Whether git's settings say what is pushed to a remote.
-bool isPushConfigured(Session &session, const std::string &remote);
+/// What git's settings say that is fetched from a remote or pushed to it.
+std::vector<std::string> configuredRefspecs(Session &session, const std::string &remote,
+                                            Direction direction);
 
 /// The short name of the current branch; nothing before the first commit, or if none is.
 std::optional<std::string> findCurrentBranch(const git::BranchManager &manager);
+
+/// Whether an address is a path, as git reads it: a colon before the first slash ends a scheme or a
+/// host.
+bool isPath(const std::string &address);
 
 std::string hexadecimal(const git::GitRemoteHead::Id &id);
 

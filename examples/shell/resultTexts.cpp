@@ -20,12 +20,6 @@ constexpr Translation resultRows[] = {
     {"Deleted the branch %1%, which was at %2%.", "Branch %1% gelöscht; er stand auf %2%.",
      "ブランチ %1% (%2%) を削除しました。"},
     {"Made the branch %1%.", "Branch %1% angelegt.", "ブランチ %1% を作成しました。"},
-    {"START must be the name of a branch or a tag. For any other commit, use \"git branch %1% "
-     "%2%\".",
-     "START muss der Name eines Branch oder eines Tags sein. Für jeden anderen Commit benutzen "
-     "Sie\n\"git branch %1% %2%\".",
-     "START にはブランチまたはタグの名前を指定してください。ほかのコミットには \"git branch %1% "
-     "%2%\" を使ってください。"},
     {"is not allowed with -d", "gehört nicht zum Löschen eines Branch",
      "ブランチの削除には指定できません"},
     {"%1% branch", "%1% Branch", "%1% 個のブランチ"},
@@ -74,14 +68,9 @@ constexpr Translation resultRows[] = {
     {"served by the back end \"%1%\"", "bedient vom Backend \"%1%\"",
      "バックエンド \"%1%\" が対応します"},
     {"Pushing to %1%:", "Hochladen zu %1%:", "%1% に送っています:"},
-    {"Nothing was pushed: there is no current branch. Name what to push.",
-     "Nichts wurde hochgeladen: Es gibt keinen aktuellen Branch. Nennen Sie, was hochzuladen ist.",
-     "何も送られませんでした。現在のブランチがありません。送るものを指定してください。"},
     {"%1% rejected:%2%", "%1% hat abgelehnt:%2%", "%1% が拒否しました:%2%"},
     {"Everything is up to date at %1%.", "Bei %1% ist alles auf dem neuesten Stand.",
      "%1% はすべて最新です。"},
-    {"Pushed to %1%, as remote.%1%.push says.", "Zu %1% hochgeladen, wie remote.%1%.push es sagt.",
-     "remote.%1%.push の設定に従って %1% に送りました。"},
     {"Nothing was removed", "Nichts wurde entfernt", "何も削除されませんでした"},
     {"Removed %1% from Git, not from the disk.", "Aus Git entfernt, nicht von der Platte: %1%.",
      "Git から削除しました (ディスクには残ります): %1%。"},
@@ -110,10 +99,10 @@ constexpr Translation resultRows[] = {
      "元に戻す変更はありません。"},
     {"Reverted %1%.", "Verworfen: %1%.", "元に戻しました: %1%。"},
     {"Not all were reverted", "Nicht alle wurden verworfen", "一部は元に戻されませんでした"},
-    {"Not every name is known", "Nicht jeder Name ist bekannt", "知られていない名前があります"},
+    {"Not every name is known", "Nicht jeder Name ist bekannt", "不明な名前があります"},
     {"Nothing was switched: there is also a tag %1%, and its files would be written instead of "
      "the\nbranch's. Rename the tag or the branch first.",
-     "Nichts wurde gewechselt: %1% ist auch ein Tag, und dessen Dateien würden geschrieben statt "
+     "Es wurde nicht gewechselt: %1% ist auch ein Tag, und dessen Dateien würden geschrieben statt "
      "der des\nBranch. Benennen Sie zuerst den Tag oder den Branch um.",
      "切り替えませんでした。%1% "
      "はタグでもあり、ブランチではなくタグのファイルが書き出されてしまいます。\n先にタグまたはブラ"

@@ -43,14 +43,13 @@ bool isTaken(const git::BranchManager &manager, const std::string &branch, const
 
 } // namespace
 
-void tellSwitchObstacles(CMAdapter &adapter, const git::BranchManager &manager,
-                         const std::string &branch)
+void refuseForObstacles(CMAdapter &adapter, const git::BranchManager &manager,
+                        const std::string &branch)
 {
     const std::string unfinished = describeUnfinished(adapter);
     if (!unfinished.empty())
     {
-        complain(unfinished);
-        return;
+        throw ShellFailure(say("Nothing was switched. %1%", unfinished));
     }
     FileStateMap changed;
     FileStateMap untracked;
@@ -70,20 +69,26 @@ void tellSwitchObstacles(CMAdapter &adapter, const git::BranchManager &manager,
             changed.insert(entry);
         }
     }
+    std::string reasons;
     if (!changed.empty())
     {
-        complain(say("These files have uncommitted changes, and differ on that branch:%1%",
-                     listNames(changed)));
+        reasons += say("These files have uncommitted changes, and differ on that branch:%1%",
+                       listNames(changed)) +
+                   '\n';
     }
     if (!untracked.empty())
     {
-        complain(
-            say("These files are not tracked, and that branch has something in their place:%1%",
-                listNames(untracked)));
+        reasons += say("These files are not tracked, and that branch has something in their "
+                       "place:%1%",
+                       listNames(untracked)) +
+                   '\n';
     }
-    complain(
-        say("Nothing was switched. Commit the changes or revert them, move untracked files out of "
-            "the way, and\nswitch again."));
+    if (!reasons.empty())
+    {
+        throw ShellFailure(reasons +
+                           say("Nothing was switched. Commit the changes or revert them, move "
+                               "untracked files out of the way, and\nswitch again."));
+    }
 }
 
 } // namespace vclink::shell

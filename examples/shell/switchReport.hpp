@@ -9,9 +9,10 @@
 namespace vclink::shell
 {
 
-/// After a switch that was refused: which files are in its way, or what is unfinished, and what to
-/// do.
-void tellSwitchObstacles(CMAdapter &adapter, const git::BranchManager &manager,
-                         const std::string &branch);
+/// After a switch that was refused.
+/// @throws ShellFailure that names the files that are in its way, or what is unfinished, and says
+///         what to do; if nothing is found, it returns
+void refuseForObstacles(CMAdapter &adapter, const git::BranchManager &manager,
+                        const std::string &branch);
 
 } // namespace vclink::shell

@@ -5,7 +5,6 @@
 #include <cerrno>
 #include <chrono>
 #include <filesystem>
-#include <fstream>
 #include <system_error>
 #include <vector>
 
@@ -32,14 +31,6 @@ namespace fs = std::filesystem;
 constexpr int isNoFastForward = -11;
 constexpr int isLocked = -14;
 constexpr int isOthers = -36;
-
-/// The folder of what all working copies of a repository share.
-fs::path sharedFolder(const fs::path &state)
-{
-    std::ifstream file(state / "commondir");
-    std::string line;
-    return std::getline(file, line) ? state / line : state;
-}
 
 std::vector<fs::path> findLocks(const fs::path &root)
 {
@@ -70,6 +61,16 @@ std::vector<fs::path> findLocks(const fs::path &root)
     return locks;
 }
 
+std::vector<fs::path> findNamedLocks(CMAdapter &adapter, const std::string &text)
+{
+    std::vector<fs::path> locks = findLocks(nativePath(adapter.getRootFolder()));
+    locks.erase(std::remove_if(locks.begin(), locks.end(),
+                               [&text](const fs::path &lock)
+                               { return text.find(lock.string()) == std::string::npos; }),
+                locks.end());
+    return locks;
+}
+
 std::string describeAge(const fs::path &file)
 {
     using Days = std::chrono::duration<long, std::ratio<86400>>;
@@ -90,6 +91,13 @@ std::string describeAge(const fs::path &file)
     }
     return age < Days(2) ? sayCount(count(std::chrono::hours()), "%1% hour", "%1% hours")
                          : sayCount(count(Days()), "%1% day", "%1% days");
+}
+
+/// libgit2 says "unsupported" of other things too, e.g. of an address.
+bool isOfFormat(const ustring &message)
+{
+    return message.find(u"unsupported repository ") == 0 ||
+           message.find(u"unsupported extension ") == 0;
 }
 
 std::string nameOf(::uid_t user)
@@ -117,7 +125,8 @@ void tellWayOut(Session &session)
                 .find(std::generic_category().message(EACCES)) != std::string::npos;
         if (code == isLocked && !isDenied)
         {
-            tellLocks(session.adapter());
+            tellLocks(session.adapter(),
+                      fl::i18n::ustring_to_utf8(failure.getError().getMessage()));
         }
         else if (code == isNoFastForward)
         {
@@ -125,7 +134,7 @@ void tellWayOut(Session &session)
                          "and push again. To discard\nthem there instead, put a plus before the "
                          "branch: \"vclink-shell push REMOTE +BRANCH\"."));
         }
-        else if (failure.getError().getMessage().find(u"unsupported ") == 0)
+        else if (isOfFormat(failure.getError().getMessage()))
         {
             complain(explainFormat(nativePath(session.adapter().getRootFolder())));
         }
@@ -145,9 +154,16 @@ void tellWayOut(Session &session)
     }
 }
 
-void tellLocks(CMAdapter &adapter)
+bool namesLock(CMAdapter &adapter, const std::string &text)
 {
-    const std::vector<fs::path> locks = findLocks(nativePath(adapter.getRootFolder()));
+    return !findNamedLocks(adapter, text).empty();
+}
+
+void tellLocks(CMAdapter &adapter, const std::string &reason)
+{
+    const std::vector<fs::path> named = findNamedLocks(adapter, reason);
+    const std::vector<fs::path> locks =
+        named.empty() ? findLocks(nativePath(adapter.getRootFolder())) : named;
     for (const fs::path &lock : locks)
     {
         complain(say("%1% was made %2% ago. If no other program is using Git here, remove it, and "

@@ -16,7 +16,11 @@ class Session;
 void tellWayOut(Session &session);
 
 /// Names the locks in a repository, and how old they are.
-void tellLocks(CMAdapter &adapter);
+/// @param reason the text of the failure; if it names some of the locks, the others are left out
+void tellLocks(CMAdapter &adapter, const std::string &reason);
+
+/// Whether a text names a lock of the repository.
+bool namesLock(CMAdapter &adapter, const std::string &text);
 
 /// Where a repository says that it has a format which libgit2 does not support.
 std::string explainFormat(const std::filesystem::path &folder);

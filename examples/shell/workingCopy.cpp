@@ -9,6 +9,7 @@
 #include <system_error>
 
 #include "failures.hpp"
+#include "gitProgram.hpp"
 #include "names.hpp"
 #include "renames.hpp"
 #include "revisions.hpp"
@@ -63,6 +64,14 @@ bool hasFilesOnDisk(const fs::path &root)
     return false;
 }
 
+/// Whether git finds nothing to track among the files that it does not track yet; unknown if git is
+/// not installed, or can't read the working copy either.
+std::optional<bool> areAllIgnored(const fs::path &root)
+{
+    const auto others = runGit(root, {"ls-files", "-z", "--others", "--exclude-standard"});
+    return others ? std::optional(others->empty()) : std::nullopt;
+}
+
 /// A question for this file alone can be answered.
 bool isGitmodulesInConflict(CMAdapter &adapter)
 {
@@ -110,6 +119,13 @@ fs::path stateFolder(const fs::path &root)
     return isElsewhere ? root / line.substr(key.size()) : place;
 }
 
+fs::path sharedFolder(const fs::path &state)
+{
+    std::ifstream file(state / "commondir");
+    std::string line;
+    return std::getline(file, line) ? state / line : state;
+}
+
 FileStateMap wholeStates(CMAdapter &adapter)
 {
     FileStateMap states = folderStates(adapter, adapter.getRootFolder());
@@ -124,14 +140,22 @@ void refuseUnknownStates(CMAdapter &adapter)
 {
     const upath &root = adapter.getRootFolder();
     const fs::path folder = nativePath(root);
-    if (!hasGitEntry(folder))
+    if (!hasGitEntry(folder) || !adapter.getFolderStates(root).empty())
     {
         return;
     }
-    const bool isTracking = hasFilesInHead(adapter) || hasFilesInIndex(folder);
-    if ((isTracking || hasFilesOnDisk(folder)) && adapter.getFolderStates(root).empty())
+    if (hasFilesInHead(adapter) || hasFilesInIndex(folder))
     {
-        throw ShellFailure(isTracking ? explainUnknownStates(adapter) : explainNoStates());
+        throw ShellFailure(explainUnknownStates(adapter));
+    }
+    if (!hasFilesOnDisk(folder))
+    {
+        return;
+    }
+    const std::optional<bool> areIgnored = areAllIgnored(folder);
+    if (!areIgnored.value_or(false))
+    {
+        throw ShellFailure(areIgnored ? explainUnknownStates(adapter) : explainNoStates());
     }
 }
 

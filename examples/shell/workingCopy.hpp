@@ -17,6 +17,10 @@ bool hasGitEntry(const std::filesystem::path &folder);
 /// @param root of the working copy
 std::filesystem::path stateFolder(const std::filesystem::path &root);
 
+/// The folder of what all working copies of a repository share.
+/// @param state of one of them, as from stateFolder(), or a bare repository
+std::filesystem::path sharedFolder(const std::filesystem::path &state);
+
 /// The states of all files of the working copy.
 /// @throws ShellFailure if they can't be known
 FileStateMap wholeStates(CMAdapter &adapter);

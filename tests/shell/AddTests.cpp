@@ -120,6 +120,24 @@ TEST_F(ShellAdd, RefusesEachNameThatItCannotServeWithTheReason)
                   "  a/b: there is no such file\n");
 }
 
+TEST_F(ShellAdd, LeavesOutRepositories)
+{
+    GitRepository inner = makeRepository("repository/inner");
+    inner.write("file", "");
+    EXPECT_EQ(refuse({"add", "inner"}),
+              "Nothing was added:\n  inner: it is a repository of its own: "
+              "use \"git submodule add\"\n");
+    EXPECT_EQ(refuse({"add", "."}),
+              "Nothing was added, because these are repositories of their own:\n  inner/\n");
+    repository_.write("new", "");
+    EXPECT_EQ(runIn(repository_.path(), {"add", "."}).errors,
+              "vclink-shell: Others were not added, because these are repositories of their "
+              "own:\n  inner/\n");
+    EXPECT_THAT(letters(), ElementsAre(Pair("inner/", "??"), Pair("new", "A ")));
+    inner.commitAll("begin");
+    EXPECT_THAT(refuse({"add", "inner"}), HasSubstr("it is a repository of its own"));
+}
+
 TEST_F(ShellAdd, DoesNotTakeANameForThePatternOfAnother)
 {
     repository_.write("a1", "");

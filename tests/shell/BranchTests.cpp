@@ -138,27 +138,41 @@ TEST_F(ShellBranches, AreDeletedMergedOrNot)
     EXPECT_THAT(refs("heads"), ElementsAre("main"));
 }
 
-TEST_F(ShellBranches, AreNotMadeOrDeletedWhereThatCannotBe)
+TEST_F(ShellBranches, BeginAtNamesOnlyAndNameTheWayToOtherCommits)
 {
-    repository_.git({"tag", "v1"});
-    repository_.git({"branch", "topic"});
-    const std::string text = "Git could not complete the operation: ";
-    const struct
+    repository_.git({"tag", "-a", "-m", "1", "v1"});
+    for (const std::string &start : {head(), std::string("main~0"), std::string("v1")})
     {
-        std::vector<std::string> arguments;
-        std::string reason;
-    } cases[] = {
-        {{"branch", "new", head()}, "no reference found for shorthand"},
-        {{"branch", "new", "main~0"},
-         "\nvclink-shell: START must be the name of a branch or a tag. For any other commit, use "
-         "\"git branch new main~0\".\n"},
-    };
-    for (const auto &[arguments, reason] : cases)
-    {
-        const std::string errors = refuse(arguments);
-        EXPECT_THAT(errors, StartsWith(text));
-        EXPECT_THAT(errors, HasSubstr(reason));
+        const std::string word = start == "main~0" ? "'main~0'" : start;
+        EXPECT_EQ(refuse({"branch", "new", start}),
+                  "No branch was made: START must be the name of a branch, or of a tag that is not "
+                  "annotated. For any\nother commit, use \"git branch new " +
+                      word + "\".\n");
     }
+}
+
+TEST_F(ShellBranches, AreNotDeletedWhereAWorkingCopyNeedsThem)
+{
+    const std::string linked = (folder() / "linked").string();
+    repository_.git({"branch", "topic"});
+    commitFiles({{"a", "ours\n"}});
+    repository_.git({"branch", "free"});
+    repository_.git({"worktree", "add", "--quiet", linked, "topic"});
+    GitRepository other(linked);
+    const std::string inUse = "Nothing was deleted: 'topic' is checked out in the working copy " +
+                              linked + ".\nSwitch to another branch there first.\n";
+    EXPECT_EQ(refuse({"branch", "-d", "topic"}), inUse);
+    other.write("a", "topic\n");
+    other.commitAll("topic");
+    ASSERT_NE(other.tryGit({"rebase", "main"}).exitStatus, 0);
+    ASSERT_NE(other.tryGit({"symbolic-ref", "--quiet", "HEAD"}).exitStatus, 0);
+    EXPECT_EQ(refuse({"branch", "-d", "topic"}), inUse);
+    const CommandResult own = runIn(linked, {"branch", "-d", "topic"});
+    EXPECT_EQ(own.errors,
+              "vclink-shell: Nothing was deleted. A rebase is under way. Continue it with \"git "
+              "rebase --continue\", or undo it with \"git rebase --abort\".\n");
+    EXPECT_THAT(refs("heads"), ElementsAre("free", "main", "topic"));
+    EXPECT_EQ(runIn(linked, {"branch", "-d", "free"}).exitStatus, 0);
 }
 
 TEST_F(ShellBranches, AreRefusedWithTheReasonAndTheWayOut)

@@ -135,7 +135,8 @@ TEST_F(ShellClone, TakesAnEmptyFolderAndNoOther)
     full.write("mine", "mine\n");
     const CommandResult result = runIn(folder().path(), {"clone", url_, "full"});
     EXPECT_EQ(result.exitStatus, 1);
-    EXPECT_THAT(result.errors, HasSubstr("exists and is not an empty directory"));
+    EXPECT_EQ(result.errors,
+              "vclink-shell: Nothing was cloned: full exists, and is not an empty folder.\n");
     EXPECT_EQ(full.read("mine"), "mine\n");
     EXPECT_FALSE(fs::exists(full / ".git"));
 
@@ -143,6 +144,24 @@ TEST_F(ShellClone, TakesAnEmptyFolderAndNoOther)
     EXPECT_EQ(below.exitStatus, 1);
     EXPECT_THAT(below.errors, StartsWith("vclink-shell: Git could not complete the operation: "));
     EXPECT_EQ(full.read("mine"), "mine\n");
+}
+
+/// No file can have a content. libgit2 can't even set the repository up, and removes nothing then.
+TEST_F(ShellClone, RemovesWhatItMadeWhereNothingCanBeWritten)
+{
+    fs::create_directory(folder() / "empty");
+    for (const std::string name : {"new", "empty", "below/new"})
+    {
+        const CommandResult result =
+            Command({"sh", "-c", "trap '' XFSZ; ulimit -f 0; exec \"$0\" clone \"$1\" \"$2\"",
+                     VCLINK_SHELL, url_, name})
+                .in(folder().path())
+                .environment("ASAN_OPTIONS", "detect_leaks=0")
+                .run();
+        EXPECT_EQ(result.exitStatus, 1);
+        EXPECT_EQ(fs::exists(folder() / name), name == "empty") << name;
+    }
+    EXPECT_TRUE(fs::is_empty(folder() / "empty"));
 }
 
 TEST_F(ShellClone, TellsWhyThereIsNothingToClone)

@@ -169,6 +169,30 @@ TEST_F(ShellFailures, NameTheLockThatWasLeftAndItsAge)
     }
 }
 
+TEST_F(ShellFailures, NameOnlyTheLockThatWasInTheWay)
+{
+    GitRepository repository = makeRepository();
+    repository.write("a", "");
+    repository.commitAll("begin");
+    repository.git({"branch", "side"});
+    repository.write("a", "ours\n");
+    repository.commitAll("ours");
+    repository.git({"checkout", "--quiet", "side"});
+    repository.write("b", "theirs\n");
+    repository.commitAll("theirs");
+    repository.write(".git/index.lock", "");
+    repository.write(".git/refs/heads/unrelated.lock", "");
+    for (const std::vector<std::string> &arguments :
+         {std::vector<std::string>{"merge", "main"},
+          std::vector<std::string>{"commit", "--allow-empty", "-m", "Work"}})
+    {
+        const CommandResult result = runIn(repository.path(), arguments);
+        EXPECT_EQ(result.exitStatus, 1);
+        EXPECT_THAT(result.errors, HasSubstr("/index.lock was made "));
+        EXPECT_THAT(result.errors, Not(HasSubstr("unrelated")));
+    }
+}
+
 TEST_F(ShellFailures, SayThatTheFolderToWorkInCannotBeEntered)
 {
     const CommandResult result = shell({"-C", "nowhere", "version"}).run();
@@ -193,7 +217,7 @@ TEST_F(ShellFailures, SayThatAPathCannotBeResolved)
 {
     const GitRepository repository = makeRepository();
     repository.symlink("loop", "loop");
-    const CommandResult result = runIn(repository.path(), {"status", "loop"});
+    const CommandResult result = runIn(repository.path(), {"status", "loop/.."});
     EXPECT_EQ(result.exitStatus, 1);
     EXPECT_EQ(result.output, "");
     EXPECT_THAT(result.errors, HasSubstr((repository / "loop").string()));

@@ -9,6 +9,7 @@ namespace
 {
 
 using testing::HasSubstr;
+using testing::Not;
 using testing::StartsWith;
 
 class ShellFetch : public ShellRemoteFixture
@@ -90,7 +91,9 @@ TEST_F(ShellFetch, RefusesARemoteThatIsNotConfigured)
     EXPECT_EQ(refuse({"fetch"}),
               "There is no remote 'origin'. Add one with \"git remote add origin "
               "ADDRESS\".\n");
-    EXPECT_THAT(refuse({"fetch", url_}), HasSubstr("is not a valid remote name"));
+    EXPECT_EQ(refuse({"fetch", url_}),
+              "There is no remote '" + url_ +
+                  "'. To use an address, give it a name: \"git remote add NAME " + url_ + "\".\n");
 }
 
 TEST_F(ShellFetch, TellsWhyARemoteCannotBeReached)
@@ -98,9 +101,56 @@ TEST_F(ShellFetch, TellsWhyARemoteCannotBeReached)
     repository_.git({"remote", "set-url", "origin", daemon().base() + "/missing.git"});
     EXPECT_THAT(refuse({"fetch", "origin"}), HasSubstr("no such repository"));
     repository_.git({"remote", "set-url", "origin", "../missing"});
-    EXPECT_THAT(refuse({"fetch", "origin"}), HasSubstr("unsupported URL protocol"));
-    EXPECT_THAT(refuse({"--lang", "de", "fetch", "origin"}),
-                StartsWith("Git konnte den Vorgang nicht "));
+    for (const std::string command : {"fetch", "push", "heads"})
+        EXPECT_EQ(refuse({command, "origin"}),
+                  "There is no repository under the path of the remote 'origin', ../missing: No "
+                  "such file or directory.\n");
+    repository_.git({"remote", "set-url", "origin", "strange://host/path"});
+    const std::string errors = refuse({"--lang", "de", "fetch", "origin"});
+    EXPECT_THAT(errors, StartsWith("Git konnte den Vorgang nicht "));
+    EXPECT_THAT(errors, Not(HasSubstr("core.repositoryformatversion")));
+}
+
+TEST_F(ShellFetch, TakesTheOnlyRemoteWhateverItsName)
+{
+    repository_.git({"remote", "rename", "origin", "upstream"});
+    succeed({"fetch"});
+    EXPECT_EQ(references(repository_).at("refs/remotes/upstream/main"),
+              references(served_).at("refs/heads/main"));
+    repository_.git({"remote", "add", "other", url_});
+    EXPECT_EQ(refuse({"fetch"}), "There is no remote 'origin'. Remotes: other, upstream.\n");
+}
+
+/// As git. The next commit would undo what the branch got.
+TEST_F(ShellFetch, MovesNoBranchThatIsCheckedOut)
+{
+    const std::string linked = (folder() / "linked").string();
+    repository_.git({"worktree", "add", "--quiet", "-b", "side", linked});
+    const struct
+    {
+        std::vector<std::string> refspecs;
+        std::string branch;
+        std::string place;
+    } cases[] = {
+        {{"main:main"}, "main", repository_.path()},
+        {{"refs/tags/v1:refs/x", "+refs/heads/*:refs/heads/*"}, "main", repository_.path()},
+        {{"refs/heads/new:side"}, "side", linked}};
+    for (const auto &[refspecs, branch, place] : cases)
+    {
+        std::vector<std::string> arguments{"fetch", "origin"};
+        arguments.insert(arguments.end(), refspecs.begin(), refspecs.end());
+        EXPECT_EQ(refuse(arguments),
+                  "Nothing was fetched: that would move the branch '" + branch +
+                      "', which is checked out in " + place +
+                      ".\nFetch into refs/remotes/origin/ instead, and merge.\n");
+        arguments.insert(arguments.begin() + 1, "--quiet");
+        EXPECT_NE(repository_.tryGit(arguments).exitStatus, 0) << refspecs.front();
+    }
+    repository_.git({"config", "remote.origin.fetch", "+refs/heads/*:refs/heads/*"});
+    EXPECT_THAT(refuse({"fetch"}), StartsWith("Nothing was fetched: that would move the branch"));
+    succeed({"fetch", "origin", "refs/heads/main:fresh"});
+    EXPECT_EQ(references(repository_).at("refs/heads/fresh"),
+              references(served_).at("refs/heads/main"));
 }
 
 TEST_F(ShellFetch, RefusesWhatIsNoRefspec)

@@ -85,9 +85,11 @@ TEST_F(ShellPush, LosesNoCommitsOfOthersUnlessToldTo)
     EXPECT_EQ(served("refs/heads/topic"), "");
     repository_.git({"fetch", "--quiet"});
     EXPECT_EQ(refuse({"push"}), reason("main"));
-    repository_.git({"config", "remote.origin.push", "refs/heads/main"});
-    EXPECT_THAT(refuse({"push"}),
-                HasSubstr("Download the remote's commits with \"vclink-shell fetch\""));
+    for (const std::string configured : {"refs/heads/main", "main", "HEAD", "refs/heads/*", ":"})
+    {
+        repository_.git({"config", "remote.origin.push", configured});
+        EXPECT_EQ(refuse({"push"}), reason("main")) << configured;
+    }
     succeed({"push", "origin", "+refs/heads/main"});
     EXPECT_EQ(served("refs/heads/main"), commit_);
 }
@@ -154,8 +156,42 @@ TEST_F(ShellPush, TakesWhatIsConfiguredOrTheCurrentBranchWhereNothingIsNamed)
     EXPECT_EQ(served("refs/heads/mine"), commit_);
     repository_.git({"config", "--unset", "remote.origin.push"});
     repository_.git({"checkout", "--quiet", "--detach"});
-    EXPECT_EQ(refuse({"push"}),
-              "Nothing was pushed: there is no current branch. Name what to push.\n");
+    for (const std::vector<std::string> &arguments :
+         {std::vector<std::string>{"push"}, std::vector<std::string>{"push", "origin", "HEAD"}})
+        EXPECT_EQ(refuse(arguments), "Nothing was pushed: there is no current branch. Name what to "
+                                     "push, e.g. HEAD:refs/heads/NAME.\n");
+}
+
+/// Each beside git.
+TEST_F(ShellPush, ResolvesThePatternsThatAreConfigured)
+{
+    repository_.git({"branch", "topic", "main~1"});
+    repository_.git({"branch", "side/one"});
+    repository_.git({"tag", "v1"});
+    const std::vector<std::string> settings[] = {
+        {":"},
+        {"refs/heads/*"},
+        {"refs/heads/side/*:refs/heads/*/theirs"},
+        {"+refs/heads/main:refs/heads/over", "refs/tags/*:refs/tags/release/*"},
+        {"refs/heads/none/*"},
+        {"HEAD", "topic"}};
+    for (const std::vector<std::string> &setting : settings)
+    {
+        const std::string name = "remote" + std::to_string(&setting - settings);
+        const GitRepository ours(folder() / name);
+        const GitRepository gits(folder() / (name + "-git"));
+        for (const GitRepository &remote : {ours, gits})
+        {
+            repository_.git({"clone", "--quiet", "--bare", served_.path(), remote.path()});
+            repository_.git({"remote", "add", remote.path().filename(), remote.path()});
+            for (const std::string &refspec : setting)
+                repository_.git({"config", "--add",
+                                 "remote." + remote.path().filename().string() + ".push", refspec});
+        }
+        succeed({"push", ours.path().filename()});
+        repository_.git({"push", "--quiet", gits.path().filename()});
+        EXPECT_EQ(references(ours), references(gits)) << setting.front();
+    }
 }
 
 TEST_F(ShellPush, ChoosesTheRemoteAsGitDoes)
@@ -217,7 +253,10 @@ TEST_F(ShellPush, RefusesWhatNamesNoCommit)
     EXPECT_EQ(refuse({"push", "origin", "main~1:new"}),
               "Nothing was pushed: there is no branch and no tag 'main~1' here. Did you mean "
               "'main'?\n");
-    EXPECT_EQ(refuse({"push", "nobody", "refs/heads/main"}), "There is no remote 'nobody'.\n");
+    EXPECT_EQ(refuse({"push", "nobody", "refs/heads/main"}),
+              "There is no remote 'nobody'. Remotes: origin.\n");
+    EXPECT_EQ(refuse({"push", "main"}), "There is no remote 'main'. 'main' is a branch: name the "
+                                        "remote before it, e.g. \"origin main\".\n");
 }
 
 TEST_F(ShellPush, GoesToAnotherFolderIfThatHasNoFilesOnTheDisk)
@@ -252,7 +291,7 @@ TEST_F(ShellPush, TellsAPersonWhatWasPushedWhere)
 TEST_F(ShellPush, TellsItsFailureInTheLanguageThatWasAskedFor)
 {
     EXPECT_EQ(refuse({"--lang", "de", "push", "nobody", "main"}),
-              "Es gibt kein Remote 'nobody'.\n");
+              "Es gibt kein Remote 'nobody'. Remotes: origin.\n");
 }
 
 } // namespace

@@ -308,7 +308,7 @@ TEST_F(ShellRevert, SaysWhyASubmoduleKeepsItsCommit)
     inner.commitAll("more");
     const CommandResult result = runIn(repository_.path(), {"revert", "."});
     EXPECT_EQ(result.exitStatus, 1);
-    EXPECT_EQ(result.errors, "vclink-shell: Not all were reverted, because a submodule keeps its "
+    EXPECT_EQ(result.errors, "vclink-shell: Nothing was reverted, because a submodule keeps its "
                              "commit until \"git submodule update\":\n  inner\n");
 }
 

@@ -361,12 +361,25 @@ TEST_F(ShellStatus, ServesALinkedWorkingTree)
     EXPECT_THAT(statesIn(folder() / "linked"), ElementsAre(Record("clean", "file")));
 }
 
-TEST_F(ShellStatus, ShowsNothingForABareRepository)
+TEST_F(ShellStatus, ShowsALinkItselfAndNotWhereItLeads)
 {
-    const GitRepository bare = makeRepository("bare");
-    bare.git({"init", "--quiet", "--bare", "."});
-    bare.remove(".git");
-    EXPECT_THAT(statesIn(bare.path()), IsEmpty());
+    const GitRepository repository = makeRepository();
+    repository.write("file", "");
+    repository.write("folder/file", "");
+    repository.write(".gitignore", "ignored\n");
+    repository.symlink("file", "link");
+    repository.symlink("folder", "way");
+    repository.symlink("/etc", "away");
+    repository.symlink("loop", "loop");
+    repository.symlink("file", "ignored");
+    EXPECT_THAT(statesIn(repository.path(), {"link", "way", "away", "loop", "ignored"}),
+                UnorderedElementsAre(Record("unversioned", "link"), Record("unversioned", "way"),
+                                     Record("unversioned", "away"), Record("unversioned", "loop")));
+    const CommandResult result = runIn(repository.path(), {"status", "link", "way/file", "loop/x"});
+    EXPECT_EQ(result.exitStatus, 1);
+    EXPECT_EQ(result.errors,
+              "vclink-shell: Not every name is known:\n  way/file: Git knows no file "
+              "of this name\n  loop/x: Git knows no file of this name\n");
 }
 
 TEST_F(ShellStatus, ShowsThousandsOfFilesAsGitDoes)

@@ -59,6 +59,8 @@ bool isForPrograms(const std::string &text)
         "Rebase/Apply mailbox", "Enumerating objects:", "Counting objects:", "Compressing objects:",
         "Resolving deltas:", "Unpacking objects:", "Checking connectivity", " is required",
         "At Most",
+        // of libgit2
+        "unsupported repository ", "unsupported extension ",
         // a failure of the system
         "A pipe can't be made", "Standard output is closed."};
     const bool isCommand = text.rfind("git ", 0) == 0 || text.rfind("vclink-shell ", 0) == 0;

@@ -106,17 +106,50 @@ TEST_F(ShellUnknownStates, AreSaidToBeBeforeTheFirstCommitToo)
     EXPECT_THAT(errorsOf({"status"}), StartsWith("vclink-shell: " + reason()));
 }
 
-TEST_F(ShellUnknownStates, AreNotThoseOfAnEmptyRepositoryOrABareOne)
+/// In an empty repository, and where Git ignores every file.
+TEST_F(ShellUnknownStates, AreNotThoseOfAWorkingCopyWithoutFilesForGit)
 {
-    const GitRepository empty = makeRepository("empty");
-    const GitRepository bare(folder() / "bare");
-    repository_.git({"clone", "--quiet", "--bare", ".", bare.path()});
-    for (const GitRepository &repository : {empty, bare})
+    const GitRepository young = makeRepository("young");
+    young.git({"config", "user.name", "A"});
+    young.git({"config", "user.email", "a@example.org"});
+    const std::string nothing =
+        "vclink-shell: Nothing was committed: no tracked file has changed.\n";
+    const std::string ignored = ":\n  file: it is ignored by Git\n";
+    const struct
     {
-        const CommandResult result = runIn(repository.path(), {"status"});
-        EXPECT_EQ(result.exitStatus, 0);
-        EXPECT_EQ(result.output + result.errors, "");
+        std::vector<std::string> arguments;
+        int exitStatus;
+        std::string errors;
+    } cases[] = {
+        {{"status"}, 0, ""},
+        {{"status", "--all", "."}, 0, ""},
+        {{"add", "--all"}, 0, ""},
+        {{"commit", "-m", "Work"}, 1, nothing},
+        {{"status", "file"}, 0, ""},
+        {{"rm", "file"}, 1, "vclink-shell: Nothing was removed" + ignored},
+        {{"revert", "file"}, 1, "vclink-shell: Nothing was reverted" + ignored},
+        {{"commit", "--allow-empty", "-m", "Begin"}, 0, ""},
+    };
+    for (std::size_t index = 0; index < 4; ++index)
+        EXPECT_EQ(runIn(young.path(), cases[index].arguments).errors, cases[index].errors) << index;
+    young.write(".gitignore", "*\n");
+    young.write("file", "");
+    for (const auto &[arguments, exitStatus, errors] : cases)
+    {
+        const CommandResult result = runIn(young.path(), arguments);
+        EXPECT_EQ(result.exitStatus, exitStatus) << arguments.front();
+        EXPECT_EQ(result.output + result.errors, errors) << arguments.front();
     }
+}
+
+TEST_F(ShellUnknownStates, AreNotGuessedWithoutGit)
+{
+    const GitRepository young = makeRepository("young");
+    young.write(".gitignore", "*\n");
+    const CommandResult result =
+        shell({"status"}).in(young.path()).environment("PATH", "/nowhere").run();
+    EXPECT_EQ(result.exitStatus, 1);
+    EXPECT_THAT(result.errors, StartsWith("vclink-shell: No file here has a state: "));
 }
 
 /// A folder in a clone that is laid out as a repository.
@@ -159,6 +192,23 @@ TEST_F(ShellBareFolder, IsTakenElsewhere)
 {
     std::filesystem::rename(repository_ / "bare", folder() / "bare");
     EXPECT_EQ(runIn(folder() / "bare", {"current"}).output, "main\n");
+}
+
+TEST_F(ShellBareFolder, HasNoFilesForCommands)
+{
+    std::filesystem::rename(repository_ / "bare", folder() / "bare");
+    const std::vector<std::string> commands[] = {{"status"},         {"add", "x"},
+                                                 {"rm", "x"},        {"resolved", "x"},
+                                                 {"revert", "x"},    {"commit", "-m", "Work"},
+                                                 {"switch", "main"}, {"merge", "main"}};
+    for (const std::vector<std::string> &command : commands)
+    {
+        const CommandResult result = runIn(folder() / "bare", command);
+        EXPECT_EQ(result.exitStatus, 1) << command.front();
+        EXPECT_EQ(result.output + result.errors,
+                  "vclink-shell: " + (folder() / "bare").string() +
+                      " is a bare repository, which has no files. Work in a clone of it.\n");
+    }
 }
 
 TEST_F(ShellBareFolder, DoesNotHinderWorkingCopies)
