@@ -182,7 +182,7 @@ class BranchCommand : public Command
 
     void refuseUnknownStart(const git::BranchManager &manager) const
     {
-        if (findRevision(manager, start()))
+        if (findRevision(manager, start() + "^{commit}"))
         {
             return;
         }

@@ -53,7 +53,7 @@ std::string nameFor(std::string specifier)
     {
     }
     takeOff("/.git") || takeOff(".git");
-    const std::string name = specifier.substr(specifier.find_last_of("/:") + 1);
+    std::string name = specifier.substr(specifier.find_last_of("/:") + 1);
     if (name.empty() || name == "." || name == "..")
     {
         throw ShellFailure(say("Nothing was cloned: name a folder for the working copy."));

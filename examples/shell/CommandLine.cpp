@@ -299,7 +299,9 @@ std::string CommandLine::describeExtra() const
                                 : instead);
     }
     const std::string word = showHidden(first);
-    return command == nullptr ? describeUnknown(word) : say("Unexpected argument '%1%'.", word);
+    return command == nullptr
+               ? describeUnknown(word)
+               : say("Unexpected argument '%1%'.", word) + suggestInstead(command->get_name(), "");
 }
 
 std::string CommandLine::describePlace(const CLI::App *command, const std::string &option) const

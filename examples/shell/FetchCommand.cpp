@@ -85,6 +85,7 @@ class FetchCommand : public Command
         }
         const std::vector<git::GitRemoteHead> heads = remote.getRemoteHeads();
         std::vector<std::string> known;
+        known.reserve(heads.size());
         for (const git::GitRemoteHead &head : heads)
         {
             known.push_back(shortReference(head.name));
@@ -152,7 +153,7 @@ class FetchCommand : public Command
             const std::string target = text.substr(colon + 1);
             // As libgit2 completes a short name.
             const std::string full = (target.find("refs/") == 0 ? "" : "refs/heads/") + target;
-            const auto source = mapReference(full, text.substr(0, colon), branch);
+            std::optional<std::string> source = mapReference(full, text.substr(0, colon), branch);
             if (source)
             {
                 return source;

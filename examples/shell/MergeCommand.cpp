@@ -31,6 +31,25 @@ bool isInOrder(const git::BranchManager &manager)
     return manager.getRepositoryState() == "Normal";
 }
 
+/// @throws ShellFailure if a name is not that of a commit
+void refuseOtherThanCommits(const git::BranchManager &manager, const std::string &name,
+                            const std::optional<std::string> &id)
+{
+    const std::optional<std::string> commit = findRevision(manager, name + "^{commit}");
+    if (!commit)
+    {
+        throw ShellFailure(
+            say("Nothing was merged: there is no branch and no commit '%1%'.", showName(name)) +
+            suggestBranch(manager, name));
+    }
+    if (commit != id)
+    {
+        throw ShellFailure(
+            say("Nothing was merged: '%1%' is an annotated tag.", showName(name)) + ' ' +
+            say("Use \"%1%\".", "vclink-shell merge " + quoteForShell(name + "^{commit}")));
+    }
+}
+
 class MergeCommand : public Command
 {
   public:
@@ -57,11 +76,9 @@ class MergeCommand : public Command
         const std::optional<std::string> before = findRevision(*manager, "HEAD");
         const std::optional<std::string> theirs = findRevision(*manager, name);
         const bool wasInOrder = isInOrder(*manager);
-        if (!theirs && wasInOrder)
+        if (wasInOrder)
         {
-            throw ShellFailure(
-                say("Nothing was merged: there is no branch and no commit '%1%'.", showName(name)) +
-                suggestBranch(*manager, name));
+            refuseOtherThanCommits(*manager, name, theirs);
         }
         MergeNotes notes;
         const ExitStatus status = merge(session, *manager, name, notes);

@@ -260,6 +260,9 @@ constexpr Translation refusalRows[] = {
      "ブランチは作成されませんでした。START "
      "にはブランチか、注釈のないタグの名前を指定してください。\nほかのコミットには \"git branch "
      "%1% %2%\" を使ってください。"},
+    {"Nothing was merged: '%1%' is an annotated tag.",
+     "Nichts wurde zusammengeführt: '%1%' ist ein annotierter Tag.",
+     "何もマージされませんでした。'%1%' は注釈付きのタグです。"},
     {"Nothing was deleted. %1%", "Nichts wurde gelöscht. %1%", "何も削除されませんでした。%1%"},
     {"Nothing was deleted: '%1%' is checked out in the working copy %2%.\nSwitch to another branch "
      "there first.",

@@ -190,6 +190,9 @@ std::string suggestInstead(const std::string &command, const std::string &option
                  {"merge", "--no-ff", "git config merge.ff false"},
                  {"merge", "--ff-only", "git config merge.ff only"},
                  {"switch", "-c", "vclink-shell branch NAME"},
+                 // For a name too many.
+                 {"commit", "", "git commit PATH"},
+                 {"merge", "", "git merge NAME..."},
                  {"merge", "--no-edit", "vclink-shell merge NAME"},
                  {"add", "-u", "vclink-shell commit"},
                  {"add", "--update", "vclink-shell commit"},

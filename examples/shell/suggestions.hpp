@@ -21,6 +21,7 @@ std::string suggestCommand(const std::string &word);
 std::string suggestBranch(const git::BranchManager &manager, const std::string &name);
 
 /// What to do in place of a command with an option that git has; empty if nothing is known.
+/// @param option empty for a name too many
 std::string suggestInstead(const std::string &command, const std::string &option);
 
 } // namespace vclink::shell

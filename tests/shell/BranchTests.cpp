@@ -210,8 +210,9 @@ TEST_F(ShellBranches, AreNotThereUnderAnotherName)
               "There is no branch 'topci'. Did you mean 'topic'?\n");
     for (const std::string name : {"nothing", "v1", "refs/heads/topic", "-x"})
         EXPECT_EQ(refuse({"branch", "-d", "--", name}), "There is no branch '" + name + "'.\n");
-    EXPECT_EQ(refuse({"branch", "new", "nothing"}),
-              "There is no branch and no commit 'nothing'.\n");
+    for (const std::string start : {"nothing", "HEAD^{tree}"})
+        EXPECT_EQ(refuse({"branch", "new", start}),
+                  "There is no branch and no commit '" + start + "'.\n");
 }
 
 TEST_F(ShellBranches, TellTheirFailuresInTheLanguageThatWasAskedFor)

@@ -116,13 +116,12 @@ class Twin
         EXPECT_EQ(result.exitStatus, 0) << script << '\n' << result.errors;
     }
 
-    /// @return what the program wrote to standard error
-    std::string play(const std::string &words, bool &succeeded) const
+    /// @return the exit status, and what the program wrote to standard error
+    CommandResult play(const std::string &words) const
     {
-        const CommandResult result = runScript(folder_ / "work", program_ + ' ' + words);
-        succeeded = result.exitStatus == 0;
+        CommandResult result = runScript(folder_ / "work", program_ + ' ' + words);
         EXPECT_LT(result.exitStatus, 130) << words << '\n' << result.errors;
-        return result.errors;
+        return result;
     }
 
     /// All that the twins have to have in common, without the ids of commits.
@@ -185,6 +184,14 @@ class Twin
     std::string program_;
 };
 
+/// What a status of git is for the program: 129 is wrong usage, all others but 0 are failures.
+int translateStatus(int status)
+{
+    constexpr int wrongUsage = 2;
+    constexpr int gitsWrongUsage = 129;
+    return status == gitsWrongUsage ? wrongUsage : status == 0 ? 0 : 1;
+}
+
 class Everyday : public ShellFixture, public testing::WithParamInterface<Scene>
 {
 };
@@ -203,20 +210,20 @@ TEST_P(Everyday, GoesAsWithGit)
             ours.prepare(step.shell);
             continue;
         }
-        bool gitSucceeds = false;
-        bool weSucceed = false;
-        const std::string gitErrors = gits.play(step.git, gitSucceeds);
-        const std::string errors = ours.play(step.shell, weSucceed);
+        const CommandResult git = gits.play(step.git);
+        const CommandResult result = ours.play(step.shell);
+        const int expectedStatus = translateStatus(git.exitStatus);
         const std::string expected = gits.describe();
         const std::string state = ours.describe();
         if (step.difference.empty())
         {
-            EXPECT_EQ(weSucceed, gitSucceeds) << errors << gitErrors;
-            ASSERT_EQ(state, expected) << errors << gitErrors;
+            EXPECT_EQ(result.exitStatus, expectedStatus) << result.errors << git.errors;
+            ASSERT_EQ(state, expected) << result.errors << git.errors;
             continue;
         }
         EXPECT_EQ(script.differences.count(step.difference), 1U) << step.difference;
-        EXPECT_TRUE(weSucceed != gitSucceeds || state != expected) << "There is no difference.";
+        EXPECT_TRUE(result.exitStatus != expectedStatus || state != expected)
+            << "There is no difference.";
         if (state != expected)
             break;
     }

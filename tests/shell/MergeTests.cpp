@@ -80,6 +80,10 @@ TEST_F(ShellMerge, TakesAnyRevisionOfACommit)
 {
     diverge();
     repository_.git({"tag", "-a", "-m", "tagged", "v1", "other"});
+    EXPECT_EQ(refuse({"merge", "v1"}), "Nothing was merged: 'v1' is an annotated tag. Use "
+                                       "\"vclink-shell merge 'v1^{commit}'\".\n");
+    EXPECT_EQ(refuse({"merge", "HEAD^{tree}"}),
+              "Nothing was merged: there is no branch and no commit 'HEAD^{tree}'.\n");
     EXPECT_THAT(run({"merge", "v1^{commit}"}).output, StartsWith("Merge commit "));
     EXPECT_EQ(run({"merge", repository_.line({"rev-parse", "other"})}).output,
               "Already up to date.\n");
@@ -172,7 +176,8 @@ TEST_F(ShellMerge, TellsItsFailuresInTheLanguageThatWasAskedFor)
     EXPECT_THAT(fail({"--lang", "de", "merge", "other"}),
                 StartsWith(german + "Eine Zusammenführung kann nicht beginnen"));
     repository_.git({"merge", "--abort"});
-    EXPECT_THAT(fail({"--lang", "de", "merge", "HEAD:a"}),
+    repository_.write(".git/index.lock", "");
+    EXPECT_THAT(fail({"--lang", "de", "merge", "other"}),
                 HasSubstr("\nGit konnte den Vorgang nicht abschließen: "));
 }
 
@@ -184,7 +189,7 @@ TEST_F(ShellMerge, ChangesNothingWhereItCannotBegin)
     EXPECT_EQ(refuse({"merge", "othr"}), "Nothing was merged: there is no branch and no commit "
                                          "'othr'. Did you mean 'other'?\n");
     EXPECT_THAT(refuse({"merge", "--", "-x"}), HasSubstr("no commit '-x'"));
-    EXPECT_THAT(refuse({"merge", "HEAD:a"}), StartsWith("\"HEAD:a\" could not be merged"));
+    EXPECT_THAT(refuse({"merge", "HEAD:a"}), HasSubstr("no commit 'HEAD:a'"));
     repository_.git({"config", "merge.ff", "only"});
     EXPECT_THAT(refuse({"merge", "other"}), HasSubstr("(merge.ff is set to \"only\")"));
 }
