@@ -2,8 +2,14 @@
 #include "AdapterFixture.hpp"
 
 #include <array>
+#include <typeinfo>
 
+#include <gtest/gtest.h>
+
+#include "error/errorUtil/callbackException.hpp"
+#include "support/Descriptors.hpp"
 #include "support/text.hpp"
+#include "vclink/util/exception/CancelledOperationException.hpp"
 
 namespace vclink::test
 {
@@ -26,6 +32,22 @@ States statesBelow(const std::string &root, const FileStateMap &states)
         below.emplace(isBelow ? name.substr(beginning.size()) : name, nameOf(state));
     }
     return below;
+}
+
+void expectCancelled(const std::function<void()> &action)
+{
+    const NoDescriptorLeak noLeak;
+    try
+    {
+        action();
+        ADD_FAILURE() << "nothing was raised";
+    }
+    catch (const std::exception &exception)
+    {
+        EXPECT_EQ(typeid(exception), typeid(vclink::util::exception::CancelledOperationException))
+            << exception.what();
+    }
+    EXPECT_EQ(git::pendingCallbackException(), nullptr);
 }
 
 std::unique_ptr<git::GitAdapter> AdapterFixture::makeAdapter(const std::string &root) const

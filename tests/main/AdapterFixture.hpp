@@ -2,11 +2,13 @@
 #pragma once
 
 #include <filesystem>
+#include <functional>
 #include <map>
 #include <memory>
 #include <string>
 
 #include "main/files/GitAdapter.hpp"
+#include "support/Change.hpp"
 #include "support/GitFixture.hpp"
 #include "support/LibGit2Session.hpp"
 #include "support/TestInteractor.hpp"
@@ -24,6 +26,10 @@ std::string nameOf(FileState state);
 
 /// A key that does not begin with the root's text stays whole.
 States statesBelow(const std::string &root, const FileStateMap &states);
+
+/// Expects that `action` ends with the exception of a cancellation and leaves nothing: no
+/// descriptor and no exception of a callback.
+void expectCancelled(const std::function<void()> &action);
 
 /// Base of the fixtures whose tests run an adapter.
 class AdapterFixture : public GitFixture

@@ -25,9 +25,7 @@ using vclink::git::LibGit2Guard;
 using vclink::git::LibGit2Version;
 using namespace vclink::test;
 
-class FailingLibGit2 : public GitFixture
-{
-};
+using FailingLibGit2 = GitFixture;
 
 TEST_F(FailingLibGit2, GoesUnnoticedByAGuard)
 {

@@ -46,15 +46,12 @@ class GuardRegistration : public AdapterFixture
         repository_.git({"config", "user.name", "Test Author"});
         repository_.git({"config", "user.email", "author@example.com"});
         repository_.git({"config", "merge.tool.driver", "cp %B %A"});
-        repository_.write(".gitattributes", "file merge=tool\n");
-        repository_.write("file", "base\n");
-        repository_.commitAll("base");
+        repository_.commitAll(
+            writes(".gitattributes", "file merge=tool\n") + writes("file", "base\n"), "base");
         repository_.git({"checkout", "--quiet", "-b", "theirs"});
-        repository_.write("file", "theirs\n");
-        repository_.commitAll("theirs");
+        repository_.commitAll(writes("file", "theirs\n"), "theirs");
         repository_.git({"checkout", "--quiet", "main"});
-        repository_.write("file", "ours\n");
-        repository_.commitAll("ours");
+        repository_.commitAll(writes("file", "ours\n"), "ours");
     }
 
     /// Whether a merge by an existing adapter runs the command; without it the file stays in

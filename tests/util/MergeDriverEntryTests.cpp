@@ -36,10 +36,7 @@ using testing::Contains;
 using testing::ElementsAre;
 using testing::IsEmpty;
 using testing::Not;
-using vclink::test::LibGit2Recorder;
-using vclink::test::LogCapture;
-using vclink::test::LogRecord;
-using vclink::test::Scripts;
+using namespace vclink::test;
 
 /// The content of the source of a merge.
 struct Source
@@ -63,7 +60,7 @@ struct Answer
     std::exception_ptr exception;
 };
 
-class MergeDriverEntry : public vclink::test::GitFixture
+class MergeDriverEntry : public GitFixture
 {
   protected:
     MergeDriverEntry()
@@ -78,7 +75,7 @@ class MergeDriverEntry : public vclink::test::GitFixture
     /// The driver's answer for the driver "tool".
     Answer apply()
     {
-        const vclink::test::NothingLeft check(environment().temporary());
+        const NothingLeft check(environment().temporary());
         static const char untouched[] = "untouched";
         const char *path = untouched;
         std::uint32_t mode = 7;
@@ -107,8 +104,8 @@ class MergeDriverEntry : public vclink::test::GitFixture
     git_index_entry ours_ = {};
     git_index_entry theirs_ = {};
     Scripts scripts_{folder() / "scripts"};
-    vclink::test::GitRepository repository_ = makeRepository();
-    vclink::test::LibGit2Session session_{environment()};
+    GitRepository repository_ = makeRepository();
+    LibGit2Session session_{environment()};
     Source source_;
     git::OwnedHandle<git_repository> opened_;
     LibGit2Recorder calls_;
@@ -231,8 +228,7 @@ TEST_F(MergeDriverEntry, LeavesPathAndModeWhenTheResultCannotBeHandedOver)
     calls_.fail({{"git_buf_set", GIT_ERROR}});
     const Answer answer = apply();
     EXPECT_EQ(answer.code, GIT_EUSER);
-    EXPECT_EQ(vclink::test::failureOf([&] { std::rethrow_exception(answer.exception); }).code,
-              GIT_ERROR);
+    EXPECT_EQ(failureOf([&] { std::rethrow_exception(answer.exception); }).code, GIT_ERROR);
     EXPECT_FALSE(answer.path);
     EXPECT_FALSE(answer.mode);
     EXPECT_EQ(steps_.back(), "git_config_free");

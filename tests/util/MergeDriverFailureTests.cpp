@@ -19,12 +19,9 @@ namespace
 {
 
 using boost::process::process_error;
-using vclink::test::failureOf;
-using vclink::test::LogCapture;
+using namespace vclink::test;
 
-class MergeDriverFailure : public vclink::test::MergeDriverFixture
-{
-};
+using MergeDriverFailure = MergeDriverFixture;
 
 TEST_F(MergeDriverFailure, IsALogicErrorForAKeyWithoutAValue)
 {
@@ -77,7 +74,7 @@ TEST_F(MergeDriverFailure, EndsTheMergeWithTheCodeOfACallback)
     makeConflict();
     define("tool", "/nowhere/tool");
     vclink::git::storeCallbackException(nullptr);
-    EXPECT_EQ(vclink::test::OpenedMerge(repository_).run(), GIT_EUSER);
+    EXPECT_EQ(OpenedMerge(repository_).run(), GIT_EUSER);
     EXPECT_NE(vclink::git::pendingCallbackException(), nullptr);
     EXPECT_THROW(std::rethrow_exception(vclink::git::pendingCallbackException()), process_error);
     vclink::git::storeCallbackException(nullptr);

@@ -16,15 +16,13 @@ namespace fs = std::filesystem;
 using testing::ElementsAre;
 using testing::IsEmpty;
 using testing::StartsWith;
-using vclink::test::LogCapture;
-using vclink::test::LogRecord;
-using vclink::test::Scripts;
+using namespace vclink::test;
 
 const std::string signature =
     "int {anonymous}::wildcardGitDriverApplyCallback(git_merge_driver*, const char**, uint32_t*, "
     "git_buf*, const char*, const git_merge_driver_source*)";
 
-class MergeDriverRecords : public vclink::test::MergeDriverFixture
+class MergeDriverRecords : public MergeDriverFixture
 {
   protected:
     /// Records as "severity message".
@@ -141,7 +139,7 @@ TEST_F(MergeDriverRecords, TellOfTemporaryFilesThatCannotBeRemovedTheLastOneFirs
     {
         LogCapture log(0x210);
         log.onRecord([&](const LogRecord &record) { texts.push_back(record.message); });
-        EXPECT_EQ(merge(vclink::test::TemporaryFiles::Stay), 0);
+        EXPECT_EQ(merge(TemporaryFiles::Stay), 0);
     }
     ASSERT_EQ(texts.size(), 6U);
     std::string told;

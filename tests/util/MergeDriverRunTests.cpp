@@ -20,9 +20,7 @@ using testing::HasSubstr;
 using testing::Not;
 using vclink::test::Scripts;
 
-class MergeDriverRun : public vclink::test::MergeDriverFixture
-{
-};
+using MergeDriverRun = vclink::test::MergeDriverFixture;
 
 TEST_F(MergeDriverRun, WorksUnderAnyNameThatHasAKey)
 {

@@ -30,13 +30,9 @@ namespace fs = std::filesystem;
 namespace git = vclink::git;
 using testing::IsEmpty;
 using testing::StartsWith;
-using vclink::test::asBytes;
-using vclink::test::asPath;
-using vclink::test::LogCapture;
-using vclink::test::LogRecord;
-using vclink::test::Scripts;
+using namespace vclink::test;
 
-class TemporaryFile : public vclink::test::GitFixture
+class TemporaryFile : public GitFixture
 {
   protected:
     static std::string write(const std::string &bytes)
@@ -70,7 +66,7 @@ TEST_F(TemporaryFile, HasANameEvenWhenItCannotBeWritten)
 
 TEST_F(TemporaryFile, KeepsQuietAboutBytesThatDoNotFit)
 {
-    const vclink::test::SignalAction ignored(SIGXFSZ, SIG_IGN);
+    const SignalAction ignored(SIGXFSZ, SIG_IGN);
     rlimit before{};
     ASSERT_EQ(::getrlimit(RLIMIT_FSIZE, &before), 0);
     rlimit small = before;
@@ -83,7 +79,7 @@ TEST_F(TemporaryFile, KeepsQuietAboutBytesThatDoNotFit)
 
 TEST_F(TemporaryFile, HoldsABlobAndIsNotMadeForOneThatIsMissing)
 {
-    const vclink::test::LibGit2Session session(environment());
+    const LibGit2Session session(environment());
     auto repository = makeRepository();
     repository.write("file", std::string("a\r\n\0b", 5));
     repository.commitAll("commit");
@@ -94,12 +90,12 @@ TEST_F(TemporaryFile, HoldsABlobAndIsNotMadeForOneThatIsMissing)
     const upath file = git::writeBlobToTemporaryFile(entry, opened.get());
     EXPECT_EQ(Scripts::read(asBytes(file)), std::string("a\r\n\0b", 5));
     git::removeTemporaryFile(file);
-    const vclink::test::NothingLeft check(environment().temporary());
+    const NothingLeft check(environment().temporary());
     git_oid_fromstr(&entry.id, std::string(40, '1').c_str());
-    EXPECT_EQ(vclink::test::failureOf(
-                  [&] { static_cast<void>(git::writeBlobToTemporaryFile(entry, opened.get())); })
-                  .code,
-              GIT_ENOTFOUND);
+    EXPECT_EQ(
+        failureOf([&] { static_cast<void>(git::writeBlobToTemporaryFile(entry, opened.get())); })
+            .code,
+        GIT_ENOTFOUND);
 }
 
 TEST_F(TemporaryFile, IsRemovedOrMayBeGoneAlreadyWithoutAWord)

@@ -29,9 +29,7 @@ using testing::IsEmpty;
 using testing::SizeIs;
 using namespace vclink::test;
 
-class CallsOnBranches : public BranchCallsFixture
-{
-};
+using CallsOnBranches = BranchCallsFixture;
 
 TEST_F(CallsOnBranches, AreTheseInOrder)
 {

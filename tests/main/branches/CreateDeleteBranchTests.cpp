@@ -47,13 +47,9 @@ class BranchChangeTest : public BranchFixture
     }
 };
 
-class CreateBranch : public BranchChangeTest
-{
-};
+using CreateBranch = BranchChangeTest;
 
-class DeleteBranch : public BranchChangeTest
-{
-};
+using DeleteBranch = BranchChangeTest;
 
 TEST_F(CreateBranch, MakesOneReferenceAndChangesNothingElse)
 {

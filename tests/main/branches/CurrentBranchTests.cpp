@@ -59,9 +59,7 @@ TEST_F(CurrentBranch, IsNoneBeforeTheFirstCommitOrOnADetachedHead)
     EXPECT_EQ(failure.text, "reference 'HEAD' is neither a local nor a remote branch.");
 }
 
-class BranchManagerObject : public BranchFixture
-{
-};
+using BranchManagerObject = BranchFixture;
 
 TEST_F(BranchManagerObject, IsMadeForAGitAdapterAloneAndOpensNoRepositoryThen)
 {

@@ -3,13 +3,10 @@
 
 #include <filesystem>
 #include <string>
-#include <typeinfo>
 
 #include <gtest/gtest.h>
 
 #include "BranchFixture.hpp"
-#include "error/errorUtil/callbackException.hpp"
-#include "vclink/util/exception/CancelledOperationException.hpp"
 
 namespace vclink::test
 {
@@ -53,20 +50,6 @@ class SwitchBranchFixture : public BranchFixture
     {
         const NothingChanges nothing(repository_);
         EXPECT_EQ(failureOf([&] { switchTo(name); }), failure);
-    }
-    void expectCancelled(const std::string &name) const
-    {
-        try
-        {
-            switchTo(name);
-            ADD_FAILURE() << "nothing was raised";
-        }
-        catch (const std::exception &exception)
-        {
-            EXPECT_EQ(typeid(exception),
-                      typeid(vclink::util::exception::CancelledOperationException));
-        }
-        EXPECT_EQ(git::pendingCallbackException(), nullptr);
     }
 };
 

@@ -30,9 +30,7 @@ class InteractorWithoutDisplay : public TestInteractor
     }
 };
 
-class SwitchBranchProgress : public SwitchBranchFixture
-{
-};
+using SwitchBranchProgress = SwitchBranchFixture;
 
 TEST_F(SwitchBranchProgress, ShowsItsProgress)
 {
@@ -78,7 +76,7 @@ TEST_F(SwitchBranchProgress, CancelledBeforeItWritesMovesNothing)
         else
             cancelAt(log, *interactor_, "Checkout Notify : ");
         const NothingChanges nothing(repository_);
-        expectCancelled("topic");
+        expectCancelled([this] { switchTo("topic"); });
         EXPECT_THAT(interactor_->progress.calls, IsEmpty());
     }
     EXPECT_NO_THROW(switchTo("topic"));
@@ -98,7 +96,7 @@ TEST_F(SwitchBranchProgress, CancelledWhileItWritesStopsTheNextCheckout)
     EXPECT_NO_THROW(switchTo("topic"));
     EXPECT_EQ(currentBranch(), "refs/heads/topic");
     interactor_->progress.onCall = nullptr;
-    expectCancelled("main");
+    expectCancelled([this] { switchTo("main"); });
     EXPECT_EQ(currentBranch(), "refs/heads/topic");
     EXPECT_NO_THROW(switchTo("main"));
     EXPECT_EQ(currentBranch(), "refs/heads/main");

@@ -26,9 +26,7 @@ using namespace vclink::test;
 const std::string switchSignature =
     "virtual void vclink::git::BasicBranchManager::switchBranch(const BranchName&)";
 
-class SwitchBranch : public SwitchBranchFixture
-{
-};
+using SwitchBranch = SwitchBranchFixture;
 
 /// There and back; with modes and links, and a name with folders and letters.
 TEST_F(SwitchBranch, MovesTheWorkingTreeTheIndexAndTheHeadAsGitDoes)

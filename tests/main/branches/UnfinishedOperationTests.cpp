@@ -88,9 +88,7 @@ TEST_P(Unfinished, RefusesASwitchAndChangesNothing)
 INSTANTIATE_TEST_SUITE_P(Operations, Unfinished, testing::ValuesIn(unfinishedOperations),
                          testing::PrintToStringParamName());
 
-class UnfinishedBisection : public Unfinished
-{
-};
+using UnfinishedBisection = Unfinished;
 
 /// Both return to a branch in the end.
 TEST_P(UnfinishedBisection, KeepsItsBranch)

@@ -27,9 +27,7 @@ Failure hiddenEdit(const std::string &name, const std::string &option)
 }
 
 /// A true merge beside edits of tracked files.
-class MergeEdits : public ObstacleFixture
-{
-};
+using MergeEdits = ObstacleFixture;
 
 TEST_F(MergeEdits, OfFilesThatItDoesNotTouchAreRefused)
 {

@@ -23,9 +23,7 @@ using vclink::util::exception::CancelledOperationException;
 using namespace vclink::test;
 
 /// A true merge beside what the user has not committed, or what git ignores.
-class MergeObstacles : public ObstacleFixture
-{
-};
+using MergeObstacles = ObstacleFixture;
 
 /// What a merge refuses, and the conflicts it comes to without.
 struct RefusedMerge

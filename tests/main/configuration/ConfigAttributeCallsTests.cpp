@@ -85,9 +85,7 @@ TEST_F(AttributeCalls, ThatGiveAnUnknownStateAreRaisedWithTheRawValue)
     EXPECT_EQ(calls.steps().back(), "git_repository_free");
 }
 
-class ConfigCalls : public GitConfigFixture
-{
-};
+using ConfigCalls = GitConfigFixture;
 
 TEST_F(ConfigCalls, OfALifeAreTheseInOrder)
 {

@@ -57,8 +57,7 @@ class InstalledTools : public MergeFixture, public testing::WithParamInterface<s
     void divergeInLines(const std::string &oursOfFile = ourText,
                         const std::string &theirsOfFile = theirText)
     {
-        repository_.write(".gitattributes", "file merge=vkAutoMerge\n");
-        repository_.commitAll("attributes");
+        repository_.commitAll(writes(".gitattributes", "file merge=vkAutoMerge\n"), "attributes");
         diverge(writes("file", oursOfFile), writes("file", theirsOfFile));
     }
     /// Puts a note in the place of the launcher, so that a run of it can be seen.

@@ -141,8 +141,7 @@ TEST_F(AddFiles, AddsNothingWhenOneOfTheFilesIsRefused)
 
 TEST_F(AddFiles, RefusesAFileInAnyStateButUnversioned)
 {
-    repository_.write("gone", "x");
-    repository_.commitAll("second");
+    repository_.commitAll(writes("gone", "x"), "second");
     beginMerge({"conflicted"});
     repository_.write("file", "edited");
     repository_.write("added", "x");
@@ -280,10 +279,9 @@ TEST_F(AddFiles, TakesFilesWhoseNamesNeedAnEscapeAndThatWereFolders)
 {
     for (const std::string name : {"!a", "sub/line\nend", "what?", "z "})
     {
-        repository_.write(name + "-beside", "x");
-        repository_.write(name + "/deep/inside", "x");
-        repository_.write(name + "/inside", "x");
-        repository_.commitAll("a folder");
+        repository_.commitAll(writes(name + "-beside", "x") + writes(name + "/deep/inside", "x") +
+                                  writes(name + "/inside", "x"),
+                              "a folder");
         repository_.remove(name);
         repository_.write(name, "x");
         const RepositoryState expected =

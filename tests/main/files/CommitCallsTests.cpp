@@ -20,9 +20,7 @@ using testing::IsEmpty;
 using testing::Not;
 using namespace vclink::test;
 
-class CommitCalls : public CommitCallsFixture
-{
-};
+using CommitCalls = CommitCallsFixture;
 
 TEST_F(CommitCalls, ComeInTheirOrderAndReleaseInReverse)
 {

@@ -119,9 +119,7 @@ class CommittingPerson : public CommitIdentity, public testing::WithParamInterfa
     }
 };
 
-class IdentifiedPerson : public CommittingPerson
-{
-};
+using IdentifiedPerson = CommittingPerson;
 
 TEST_P(IdentifiedPerson, IsInTheCommitAndTheReflog)
 {
@@ -165,9 +163,7 @@ const Person identifiedPersons[]{
 INSTANTIATE_TEST_SUITE_P(The, IdentifiedPerson, testing::ValuesIn(identifiedPersons),
                          testing::PrintToStringParamName());
 
-class RefusedPerson : public CommittingPerson
-{
-};
+using RefusedPerson = CommittingPerson;
 
 TEST_P(RefusedPerson, ChangesNothing)
 {

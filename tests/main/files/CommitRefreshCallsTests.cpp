@@ -63,8 +63,7 @@ TEST_F(RefreshOfACommit, ComesAfterWhatChangedIsStagedByItsPath)
 /// The refresh alone knows in which order attributes and files count.
 TEST_F(RefreshOfACommit, StagesEverythingItselfBesideChangedAttributes)
 {
-    repository_.write("sub/.gitattributes", "* text\n");
-    repository_.commitAll("attributes");
+    repository_.commitAll(writes("sub/.gitattributes", "* text\n"), "attributes");
     repository_.write("file", "changed\n");
     repository_.remove("sub/.gitattributes");
     startNoting();

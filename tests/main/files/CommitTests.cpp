@@ -27,8 +27,7 @@ class Commit : public CommitFixture
 
 TEST_F(Commit, HoldsWhatGitWouldStageOfTrackedFiles)
 {
-    repository_.write("again", "x");
-    repository_.commitAll("second");
+    repository_.commitAll(writes("again", "x"), "second");
     repository_.write("again", "staged\n");
     repository_.add({"again"});
     repository_.write("again", "changed since\n");

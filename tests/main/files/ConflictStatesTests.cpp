@@ -10,10 +10,10 @@
 namespace
 {
 
-using vclink::test::States;
+using namespace vclink::test;
 
 /// A merge of two branches that changed one file each in its way.
-class ConflictStates : public vclink::test::AdapterFixture
+class ConflictStates : public AdapterFixture
 {
   protected:
     using Content = std::optional<std::string>;
@@ -30,8 +30,7 @@ class ConflictStates : public vclink::test::AdapterFixture
     /// @return git's two letters for the file
     std::string merge(const Content &base, const Content &ours, const Content &theirs)
     {
-        repository_.write("bystander", "x");
-        repository_.commitAll("beginning");
+        repository_.commitAll(writes("bystander", "x"), "beginning");
         if (base)
             commit(base);
         repository_.git({"branch", "other"});
@@ -51,10 +50,10 @@ class ConflictStates : public vclink::test::AdapterFixture
         EXPECT_EQ(states(repository_, {"file"}), (States{{"file", "InConflict"}}));
     }
 
-    vclink::test::GitRepository repository_ = makeRepository();
+    GitRepository repository_ = makeRepository();
 };
 
-struct ConflictRow : vclink::test::Sentence
+struct ConflictRow : Sentence
 {
     std::optional<std::string> base;
     std::optional<std::string> ours;
@@ -97,8 +96,7 @@ TEST_F(ConflictStates, StandsWhateverIsOnDiskUntilTheFileIsStaged)
 /// The three stages of a renaming on both sides, of which each path has one only.
 TEST_F(ConflictStates, OfAFileThatBothRenamed)
 {
-    repository_.write("file", std::string(1000, 'x') + "\n");
-    repository_.commitAll("base");
+    repository_.commitAll(writes("file", std::string(1000, 'x') + "\n"), "base");
     repository_.git({"branch", "other"});
     repository_.git({"mv", "file", "ours"});
     repository_.commit("ours");

@@ -21,17 +21,15 @@ using testing::Contains;
 using testing::ElementsAre;
 using testing::IsEmpty;
 using testing::Not;
-using vclink::test::indexOf;
-using vclink::test::linesOf;
-using vclink::test::RepositoryState;
+using namespace vclink::test;
 
-class EmptiedFiles : public vclink::test::CommitFixture
+class EmptiedFiles : public CommitFixture
 {
   protected:
     /// The failure of an operation in a process of its own; empty if it succeeds.
     static std::string endOf(const std::function<void()> &operation)
     {
-        return vclink::test::runInChild(
+        return runInChild(
             [&]
             {
                 operation();
@@ -40,8 +38,7 @@ class EmptiedFiles : public vclink::test::CommitFixture
     }
     void commitAttributes(const std::string &attributes = "* text\n")
     {
-        repository_.write(".gitattributes", attributes);
-        repository_.commitAll("attributes");
+        repository_.commitAll(writes(".gitattributes", attributes), "attributes");
     }
     /// Commits, and expects what git makes of the same.
     void expectCommittedAsByGit() const
@@ -167,7 +164,7 @@ TEST_F(EmptiedFiles, FailAsBeforeWhereAnotherFileFails)
     repository_.git({"config", "core.safecrlf", "true"});
     repository_.write("file", "");
     repository_.write("other", "a\r\nb\n");
-    const vclink::test::NothingChanges nothing(repository_);
+    const NothingChanges nothing(repository_);
     EXPECT_THAT(endOf([this] { commit(); }),
                 testing::HasSubstr("CRLF would be replaced by LF in 'other'"));
 }

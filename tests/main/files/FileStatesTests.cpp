@@ -22,9 +22,7 @@ class FileStates : public AdapterFixture
   protected:
     FileStates()
     {
-        repository_.write("file", "content\n");
-        repository_.write("other", "more\n");
-        repository_.commitAll("first");
+        repository_.commitAll(writes("file", "content\n") + writes("other", "more\n"), "first");
     }
 
     void expectState(const std::string &name, const std::string &state) const
@@ -98,8 +96,7 @@ INSTANTIATE_TEST_SUITE_P(TheFile, StateOf, testing::ValuesIn(stateCases),
 /// libgit2 reports only the renaming, with the old path.
 TEST_F(FileStates, OfAStagedRenamingIsUnknownUnderOnePath)
 {
-    repository_.write("long", std::string(1000, 'x') + "\n");
-    repository_.commitAll("second");
+    repository_.commitAll(writes("long", std::string(1000, 'x') + "\n"), "second");
     repository_.git({"mv", "long", "renamed"});
     const States all = allStates(repository_);
     EXPECT_EQ(all, (States{{"file", "Clean"}, {"other", "Clean"}, {"long", "Unknown"}}));
@@ -143,8 +140,7 @@ TEST_F(FileStates, OfAFileThatBecameAFolderAreMissingAndUnversioned)
 /// As git has it: the changed length is enough until the file is staged, which changes nothing.
 TEST_F(FileStates, OfALineEndThatGitConvertsIsCleanOnceItIsStaged)
 {
-    repository_.write(".gitattributes", "file text eol=crlf\n");
-    repository_.commitAll("second");
+    repository_.commitAll(writes(".gitattributes", "file text eol=crlf\n"), "second");
     repository_.write("file", "content\r\n");
     expectState("file", "Modified");
     ASSERT_EQ(repository_.git({"status", "--porcelain"}), " M file\n");

@@ -22,9 +22,7 @@ class FolderStates : public AdapterFixture
 
 TEST_F(FolderStates, OfTheRootAreThoseOfTheWholeTree)
 {
-    repository_.write("a", "x");
-    repository_.write("sub/b", "x");
-    repository_.commitAll("first");
+    repository_.commitAll(writes("a", "x") + writes("sub/b", "x"), "first");
     repository_.write("sub/deep/c", "x");
     const States all{{"a", "Clean"}, {"sub/b", "Clean"}, {"sub/deep/c", "Unversioned"}};
     EXPECT_EQ(folderStates(repository_, ""), all);
@@ -54,8 +52,7 @@ TEST_F(FolderStates, LeaveIgnoredFilesOut)
 
 TEST_F(FolderStates, OfAFolderThatIsGoneAreThoseOfItsTrackedFiles)
 {
-    repository_.write("sub/a", "x");
-    repository_.commitAll("first");
+    repository_.commitAll(writes("sub/a", "x"), "first");
     repository_.remove("sub");
     EXPECT_EQ(folderStates(repository_, "sub"), (States{{"sub/a", "Missing"}}));
 }
@@ -97,8 +94,7 @@ TEST_F(FolderStates, OfManyFilesComeInTheOrderOfFileReports)
 
 TEST_F(FolderStates, OfALinkedWorktreeAreItsOwn)
 {
-    repository_.write("file", "x");
-    repository_.commitAll("first");
+    repository_.commitAll(writes("file", "x"), "first");
     repository_.git({"worktree", "add", "--quiet", (folder() / "linked").string()});
     repository_.write("file", "edited here");
     const GitRepository linked(folder() / "linked");

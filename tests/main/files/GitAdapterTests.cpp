@@ -24,9 +24,7 @@ using vclink::exception::SourceControlException;
 using vclink::git::GitAdapter;
 using namespace vclink::test;
 
-class GitAdapterTest : public AdapterFixture
-{
-};
+using GitAdapterTest = AdapterFixture;
 
 TEST_F(GitAdapterTest, GivesBackTheVeryRootItWasGiven)
 {

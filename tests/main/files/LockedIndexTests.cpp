@@ -126,8 +126,7 @@ TEST_F(LockedIndex, LeavesAMergeThatHasBegunSinceItsOwnOrItsFastForwardWasDecide
         if (isDiverged)
         {
             repository_.git({"merge", "--abort"});
-            repository_.write("ours", "x");
-            repository_.commitAll("on main");
+            repository_.commitAll(writes("ours", "x"), "on main");
         }
         const std::string ours = idOf("main");
         const std::string failure = mergeMeeting(

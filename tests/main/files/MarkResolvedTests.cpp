@@ -16,9 +16,7 @@ namespace fs = std::filesystem;
 using testing::ElementsAre;
 using namespace vclink::test;
 
-class MarkResolved : public StagingFixture
-{
-};
+using MarkResolved = StagingFixture;
 
 TEST_F(MarkResolved, PutsWhatStandsOrItsAbsenceIntoThePlaceOfAConflict)
 {
@@ -92,8 +90,7 @@ INSTANTIATE_TEST_SUITE_P(Merges, MarkResolvedOfADeletion, testing::ValuesIn(dele
 
 TEST_F(MarkResolved, EndsTheConflictOfEachPathOfARenaming)
 {
-    repository_.write("old", std::string(1000, 'x') + "\n");
-    repository_.commitAll("second");
+    repository_.commitAll(writes("old", std::string(1000, 'x') + "\n"), "second");
     repository_.git({"branch", "theirs"});
     repository_.git({"mv", "old", "ours"});
     repository_.commit("ours");
@@ -153,8 +150,7 @@ TEST_F(MarkResolved, TakesAFolderForAllBelowIt)
 
 TEST_F(MarkResolved, TakesALinkForItsTarget)
 {
-    repository_.symlink("file", "link");
-    repository_.commitAll("second");
+    repository_.commitAll(links("file", "link"), "second");
     repository_.write("file", "edited\n");
     repository_.remove("link");
     repository_.symlink("other", "link");
@@ -168,8 +164,7 @@ TEST_F(MarkResolved, TakesALinkForItsTarget)
 /// The link's target decides whether the file exists.
 TEST_F(MarkResolved, TakesALinkThatLeadsNowhereForAnAbsence)
 {
-    repository_.symlink("nowhere", "link");
-    repository_.commitAll("second");
+    repository_.commitAll(links("nowhere", "link"), "second");
     markResolved("link");
     EXPECT_THAT(status(), ElementsAre("D  link", "?? link"));
 }

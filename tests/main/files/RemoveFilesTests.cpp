@@ -156,9 +156,7 @@ TEST_F(RemoveFiles, LeavesAnUnversionedFileAsItIsAndRemovesTheOthers)
 
 TEST_F(RemoveFiles, RemovesAFileInAnyStateButDeleted)
 {
-    repository_.write("gone", "x");
-    repository_.write("staged", "x");
-    repository_.commitAll("second");
+    repository_.commitAll(writes("gone", "x") + writes("staged", "x"), "second");
     repository_.write("file", "edited");
     repository_.write("staged", "edited");
     repository_.write("added", "x");
@@ -203,8 +201,7 @@ TEST_F(RemoveFiles, WorksInARepositoryWithoutACommit)
 
 TEST_F(RemoveFiles, TakesALinkForItsTarget)
 {
-    repository_.symlink("file", "link");
-    repository_.commitAll("second");
+    repository_.commitAll(links("file", "link"), "second");
     remove({"link"});
     EXPECT_THAT(status(), ElementsAre("D  file", "?? file"));
 }
@@ -212,8 +209,7 @@ TEST_F(RemoveFiles, TakesALinkForItsTarget)
 /// The files in the folder are looked up by name again.
 TEST_F(RemoveFiles, TakesALinkAmongTheFilesOfAFolderForItsTarget)
 {
-    repository_.symlink("../file", "sub/link");
-    repository_.commitAll("second");
+    repository_.commitAll(links("../file", "sub/link"), "second");
     remove({"sub"});
     EXPECT_THAT(status(), ElementsAre("D  file", "D  sub/inside", "?? file", "?? sub/inside"));
 }

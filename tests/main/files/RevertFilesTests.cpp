@@ -16,9 +16,7 @@ using shared_vclink::git::Conflicted;
 using testing::ElementsAre;
 using namespace vclink::test;
 
-class RevertFiles : public StagingFixture
-{
-};
+using RevertFiles = StagingFixture;
 
 /// What is changed, what is reverted and git's status then; what is done and committed before.
 struct RevertRow : Sentence

@@ -41,8 +41,7 @@ class RevertProgress : public AdapterFixture
         git::pendingCallbackException() = nullptr;
         for (const auto &name : names_)
             repository_.write(name, "committed\n");
-        repository_.write("other", "committed\n");
-        repository_.commitAll("first");
+        repository_.commitAll(writes("other", "committed\n"), "first");
     }
     ~RevertProgress() override
     {
@@ -118,8 +117,7 @@ TEST_F(RevertProgress, SpeaksTheLanguageOfTheProcess)
 TEST_F(RevertProgress, NamesAFileThatIsNoUtf8)
 {
     const std::string name = "caf\xE9/\xC3\xBC";
-    repository_.write(name, "committed\n");
-    repository_.commitAll("second");
+    repository_.commitAll(writes(name, "committed\n"), "second");
     repository_.remove(name);
     revert({name});
     EXPECT_THAT(calls(), ElementsAre(0.0, 1.0, message(u"Checking out " + asUtf16(name))));

@@ -16,14 +16,11 @@ using testing::ElementsAre;
 using namespace vclink::test;
 
 /// Reverts if more than the content of a file was changed: its mode, its line ends, or its kind.
-class RevertedKinds : public StagingFixture
-{
-};
+using RevertedKinds = StagingFixture;
 
 TEST_F(RevertedKinds, TakesALinkForItsTarget)
 {
-    repository_.symlink("file", "link");
-    repository_.commitAll("second");
+    repository_.commitAll(links("file", "link"), "second");
     repository_.write("file", "edited\n");
     repository_.write("other", "edited\n");
     revert({"link"});
@@ -59,9 +56,7 @@ TEST_F(RevertedKinds, MakesALinkAgainOfAStagedFolder)
 TEST_F(RevertedKinds, MakesFilesAndLinksAgainOfStagedFolders)
 {
     const std::vector<std::string> names{"a first", "file", "link", "other", "sub/inside"};
-    repository_.write("a first", "x");
-    repository_.symlink("file", "link");
-    repository_.commitAll("second");
+    repository_.commitAll(writes("a first", "x") + links("file", "link"), "second");
     for (const std::string &name : names)
     {
         repository_.remove(name);
@@ -78,8 +73,7 @@ TEST_F(RevertedKinds, MakesFilesAgainOfStagedFoldersWhoseNamesNeedAnEscape)
 {
     for (const std::string name : {"!a", "sub/line\nend", "z "})
     {
-        repository_.write(name, "x");
-        repository_.commitAll("a file");
+        repository_.commitAll(writes(name, "x"), "a file");
         repository_.remove(name);
         repository_.write(name + "/a", "x");
         repository_.write(name + "/deep/b", "x");
@@ -115,9 +109,7 @@ TEST_F(RevertedKinds, WritesNothingThroughAStagedLinkThatStandsForAFile)
 
 TEST_F(RevertedKinds, WritesNothingThroughALinkThatStandsForAFolder)
 {
-    repository_.write("dir/sub/a", "x");
-    repository_.write("dir/sub/deep/b", "x");
-    repository_.commitAll("second");
+    repository_.commitAll(writes("dir/sub/a", "x") + writes("dir/sub/deep/b", "x"), "second");
     repository_.write("../outside/a", "precious");
     repository_.remove("dir/sub");
     repository_.symlink("../../outside", "dir/sub");

@@ -18,8 +18,7 @@ class StateKeys : public AdapterFixture
   protected:
     StateKeys()
     {
-        repository_.write("sub/file", "x");
-        repository_.commitAll("first");
+        repository_.commitAll(writes("sub/file", "x"), "first");
         repository_.symlink("repository", "../link");
     }
 

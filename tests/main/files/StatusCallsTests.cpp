@@ -176,15 +176,8 @@ TEST_F(StatusWalk, LeavesTheExceptionForTheNextUserErrorOnTheThread)
 {
     raiseAfter(0, [] { throw std::runtime_error("in the callback"); });
     EXPECT_EQ(query(), States());
-    try
-    {
-        vclink::git::makeResult(GIT_EUSER).value();
-        FAIL() << "no exception";
-    }
-    catch (const std::runtime_error &error)
-    {
-        EXPECT_STREQ(error.what(), "in the callback");
-    }
+    EXPECT_THAT([] { vclink::git::makeResult(GIT_EUSER).value(); },
+                testing::ThrowsMessage<std::runtime_error>("in the callback"));
     EXPECT_EQ(pendingCallbackException(), nullptr);
     EXPECT_THROW(vclink::git::makeResult(GIT_EUSER).value(), LibGit2Exception);
 }
@@ -193,15 +186,7 @@ TEST_F(StatusWalk, LeavesAnExceptionOfAnyKindFound)
 {
     raiseAfter(1, [] { throw 42; });
     EXPECT_EQ(query(), (States{{"a", "Unversioned"}}));
-    try
-    {
-        vclink::git::makeResult(GIT_EUSER).value();
-        FAIL() << "no exception";
-    }
-    catch (int thrown)
-    {
-        EXPECT_EQ(thrown, 42);
-    }
+    EXPECT_THAT([] { vclink::git::makeResult(GIT_EUSER).value(); }, testing::Throws<int>(42));
 }
 
 #ifdef __clang__

@@ -39,8 +39,7 @@ class StatusFailure : public AdapterFixture
   protected:
     StatusFailure()
     {
-        repository_.write("file", "x");
-        repository_.commitAll("first");
+        repository_.commitAll(writes("file", "x"), "first");
         repository_.write("new", "x");
     }
 
@@ -103,8 +102,7 @@ TEST_F(StatusFailure, OfAnUntrackedFolderThatCannotBeReadLeavesItOut)
 
 TEST_F(StatusFailure, OfATrackedFolderThatCannotBeReadTellsItsFilesAsMissing)
 {
-    repository_.write("locked/inside", "x");
-    repository_.commitAll("second");
+    repository_.commitAll(writes("locked/inside", "x"), "second");
     repository_.setMode("locked", 0000);
     giveToUnprivilegedUser(repository_.path());
     EXPECT_EQ(

@@ -15,16 +15,15 @@ namespace
 {
 
 using testing::ElementsAre;
-using vclink::test::NothingChanges;
+using namespace vclink::test;
 
 /// Base of the fixtures whose working copy can't be read whole by its owner.
-class UnreadableTest : public vclink::test::CommitFixture
+class UnreadableTest : public CommitFixture
 {
   protected:
     UnreadableTest()
     {
-        repository_.write("sub/deep/lowest", "x");
-        repository_.commitAll("deep");
+        repository_.commitAll(writes("sub/deep/lowest", "x"), "deep");
     }
 
     /// Takes permissions away, commits, and gives them back.
@@ -111,7 +110,7 @@ TEST_F(UnreadableCommit, DropsAFileThatIsGoneFromAFolderThatCannotBeListed)
 TEST_F(UnreadableCommit, DoesNotCareForAnUntrackedFolder)
 {
     repository_.write("untracked/file", "x");
-    vclink::test::giveToUnprivilegedUser(repository_.path());
+    giveToUnprivilegedUser(repository_.path());
     EXPECT_EQ(commitWithMode("untracked", 0000), "committed");
     EXPECT_EQ(committed("file"), "changed\n");
 }
@@ -119,7 +118,7 @@ TEST_F(UnreadableCommit, DoesNotCareForAnUntrackedFolder)
 TEST_F(UnreadableCommit, KeepsWhatIsNotCheckedOutInAFolderThatCannotBeRead)
 {
     repository_.git({"update-index", "--skip-worktree", "sub/inside", "sub/deep/lowest"});
-    vclink::test::giveToUnprivilegedUser(repository_.path());
+    giveToUnprivilegedUser(repository_.path());
     EXPECT_EQ(commitWithMode("sub", 0000), "committed");
     EXPECT_THAT(namesIn(), ElementsAre("file", "other", "sub/deep/lowest", "sub/inside"));
 }
@@ -147,7 +146,7 @@ TEST_F(UnreadableMergeConclusion, IsRefusedAndTheMergeStaysUnderWayUntilItCanBeR
 TEST_F(UnreadableMergeConclusion, IsRefusedOverAConflictThatCannotBeRead)
 {
     repository_.git({"rm", "--quiet", "--cached", "sub/deep/lowest"});
-    vclink::test::giveToUnprivilegedUser(repository_.path());
+    giveToUnprivilegedUser(repository_.path());
     expectRefused("sub", 0000,
                   "-1 2 could not read 'sub/inside', which is tracked: Permission denied");
 }

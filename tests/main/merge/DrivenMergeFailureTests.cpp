@@ -155,15 +155,8 @@ TEST_F(DrivenMergeFailure, OfAnythingElseAtEveryStepComesOutUnchanged)
     {
         SCOPED_TRACE(step);
         const NothingMerged nothing(repository_);
-        try
-        {
-            mergeRaisingAt(step, [step] { throw step; });
-            ADD_FAILURE() << "no exception";
-        }
-        catch (int raised)
-        {
-            EXPECT_EQ(raised, step);
-        }
+        EXPECT_THAT([&] { mergeRaisingAt(step, [step] { throw step; }); },
+                    testing::Throws<int>(step));
     }
     expectTheNextToSucceed();
 }

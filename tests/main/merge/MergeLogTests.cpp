@@ -62,9 +62,7 @@ TEST(MergePreferenceText, HasTheWordsOfTheBitsWithABlankBehindEach)
         EXPECT_EQ(mergePreferenceToText(bits), text) << bits;
 }
 
-class MergeLog : public MergeFixture
-{
-};
+using MergeLog = MergeFixture;
 
 /// What is merged, what the two records about it say and whether the merge fails then.
 struct Decision : Sentence

@@ -20,9 +20,7 @@ using testing::ElementsAre;
 using namespace vclink::test;
 
 /// A merge of diverged branches without conflicts, compared with what git makes of the same.
-class ThreeWayMerge : public MergeFixture
-{
-};
+using ThreeWayMerge = MergeFixture;
 
 /// What each side does, what the working copy holds then ("" for nothing), and what is done and
 /// committed before.

@@ -32,9 +32,7 @@ static_assert(std::is_abstract_v<git::GitRemote> && std::has_virtual_destructor_
 static_assert(std::is_same_v<decltype(git::GitRemoteHead::local), std::int32_t>);
 static_assert(sizeof(git::GitRemoteHead::oid) == 20 && sizeof(git::GitRemoteHead::loid) == 20);
 
-class GitRemoteTest : public RemoteFixture
-{
-};
+using GitRemoteTest = RemoteFixture;
 
 std::string hexadecimal(const git::GitRemoteHead::Id &id)
 {

@@ -35,9 +35,7 @@ static_assert(!std::is_copy_constructible_v<Generator> && !std::is_copy_assignab
 const std::string generateSignature =
     "virtual void vclink::git::GitWorkingCopyGenerator::generate(const ustring&, const upath&)";
 
-class GeneratorObject : public CloneFixture
-{
-};
+using GeneratorObject = CloneFixture;
 
 /// Clones of a repository on this machine, named either way.
 class Clone : public CloneFixture, public testing::WithParamInterface<Naming>

@@ -18,9 +18,7 @@ using testing::Not;
 using testing::StartsWith;
 using namespace vclink::test;
 
-class RemoteCancellation : public RemoteFixture
-{
-};
+using RemoteCancellation = RemoteFixture;
 
 TEST_F(RemoteCancellation, AskedForBeforeStopsAFetchAtItsFirstPollPointAndIsForgotten)
 {

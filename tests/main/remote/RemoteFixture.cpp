@@ -27,22 +27,6 @@ std::vector<ustring> asTexts(const std::vector<std::string> &texts)
 
 } // namespace
 
-void expectCancelled(const std::function<void()> &action)
-{
-    const NoDescriptorLeak noLeak;
-    try
-    {
-        action();
-        ADD_FAILURE() << "nothing was raised";
-    }
-    catch (const std::exception &exception)
-    {
-        EXPECT_EQ(typeid(exception), typeid(vclink::util::exception::CancelledOperationException))
-            << exception.what();
-    }
-    EXPECT_EQ(git::pendingCallbackException(), nullptr);
-}
-
 RemoteFixture::RemoteFixture(Naming naming) : naming_(naming)
 {
     std::filesystem::create_directory(server_.path());

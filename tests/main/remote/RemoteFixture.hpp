@@ -19,10 +19,6 @@ enum class Naming
     FileUrl
 };
 
-/// Expects that `action` ends with the exception of a cancellation, which leaves no descriptor
-/// open.
-void expectCancelled(const std::function<void()> &action);
-
 /// Base of the fixtures whose tests talk to a remote: a bare repository, "server", to which a
 /// second working copy, "author", has pushed the branch "main". The working copy under test names
 /// it "origin" and has fetched nothing yet.

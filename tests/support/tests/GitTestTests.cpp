@@ -33,9 +33,7 @@ std::map<std::string, std::string> filesBelow(const fs::path &folder)
     return files;
 }
 
-class GitRepositoryTest : public vclink::test::GitFixture
-{
-};
+using GitRepositoryTest = vclink::test::GitFixture;
 
 TEST_F(GitRepositoryTest, BeginsAsGitInitMakesItAndNotOverAnother)
 {
@@ -125,16 +123,13 @@ TEST_F(GitRepositoryTest, TellsTheIdOfACommitOnABranchOnNoneAndInALinkedWorkingC
 TEST_F(GitRepositoryTest, RaisesWithTheWordsOfGit)
 {
     const auto repository = makeRepository();
-    try
-    {
-        repository.git({"rev-parse", "--verify", "nothing"});
-        FAIL() << "no exception";
-    }
-    catch (const std::runtime_error &error)
-    {
-        EXPECT_THAT(error.what(), HasSubstr("rev-parse --verify nothing"));
-        EXPECT_THAT(error.what(), HasSubstr("fatal: Needed a single revision"));
-    }
+    EXPECT_THAT(
+        [&] {
+            repository.git({"rev-parse", "--verify", "nothing"});
+        },
+        testing::ThrowsMessage<std::runtime_error>(
+            testing::AllOf(HasSubstr("rev-parse --verify nothing"),
+                           HasSubstr("fatal: Needed a single revision"))));
     EXPECT_EQ(repository.tryGit({"rev-parse", "--verify", "nothing"}).exitStatus, 128);
 }
 

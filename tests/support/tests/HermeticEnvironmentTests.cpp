@@ -16,8 +16,7 @@
 namespace
 {
 
-using vclink::test::HermeticEnvironment;
-using vclink::test::TemporaryFolder;
+using namespace vclink::test;
 
 std::string variable(const char *name)
 {
@@ -84,7 +83,7 @@ TEST(HermeticEnvironment, LeavesGitWithoutAnyConfiguration)
 {
     const TemporaryFolder folder;
     const HermeticEnvironment environment(folder.path());
-    const auto list = vclink::test::Command({"git", "config", "--list"}).in(folder.path()).run();
+    const auto list = Command({"git", "config", "--list"}).in(folder.path()).run();
     EXPECT_TRUE(list.succeeded()) << list.errors;
     EXPECT_EQ(list.output, "");
 }
@@ -140,7 +139,7 @@ TEST(LibGit2Session, ReadsNoConfigurationOfTheSystem)
 {
     const TemporaryFolder folder;
     const HermeticEnvironment environment(folder.path());
-    const vclink::test::LibGit2Session session(environment);
+    const LibGit2Session session(environment);
     git_buf path{};
     ASSERT_EQ(git_libgit2_opts(GIT_OPT_GET_SEARCH_PATH, GIT_CONFIG_LEVEL_SYSTEM, &path), 0);
     EXPECT_EQ(std::string(path.ptr), folder / "etc");

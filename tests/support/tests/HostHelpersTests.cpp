@@ -17,8 +17,7 @@ namespace
 {
 
 using testing::ElementsAre;
-using vclink::test::LogCapture;
-using vclink::test::ProgressCall;
+using namespace vclink::test;
 
 using Logger = foundation::core::log::basic_diagnostic_logger<char>;
 
@@ -32,10 +31,10 @@ void write(Logger &logger, unsigned severity, const std::string &text)
 
 TEST(LogCapture, CollectsTheRecordsOfItsLoggerInOrder)
 {
-    Logger logger("vclink::test::one");
-    Logger other("vclink::test::other");
-    vclink_host::setEnabledSeverities("vclink::test::other", 0x02);
-    const LogCapture capture(0x06, "vclink::test::one");
+    Logger logger("one");
+    Logger other("other");
+    vclink_host::setEnabledSeverities("other", 0x02);
+    const LogCapture capture(0x06, "one");
     write(logger, 0x02, "first");
     write(other, 0x02, "not mine");
     write(logger, 0x08, "not enabled");
@@ -43,7 +42,7 @@ TEST(LogCapture, CollectsTheRecordsOfItsLoggerInOrder)
     const auto records = capture.records();
     ASSERT_EQ(records.size(), 2u);
     EXPECT_EQ(records[0].severity, 0x02u);
-    EXPECT_EQ(records[0].channel, "vclink::test::one");
+    EXPECT_EQ(records[0].channel, "one");
     EXPECT_EQ(records[0].message, "first");
     EXPECT_EQ(records[1].severity, 0x04u);
     EXPECT_THAT(capture.messages(), ElementsAre("first", "second"));
@@ -52,16 +51,15 @@ TEST(LogCapture, CollectsTheRecordsOfItsLoggerInOrder)
 
 TEST(LogCapture, TellsOfEachRecordForgetsOnRequestAndPutsBackTheSeverities)
 {
-    Logger logger("vclink::test::told");
-    vclink_host::setEnabledSeverities("vclink::test::told", 0x10);
+    Logger logger("told");
+    vclink_host::setEnabledSeverities("told", 0x10);
     {
-        LogCapture capture(0x02, "vclink::test::told");
+        LogCapture capture(0x02, "told");
         EXPECT_EQ(logger.enabled_severities(), 0x02u);
         write(logger, 0x02, "first");
         capture.clear();
         std::vector<std::string> told;
-        capture.onRecord([&told](const vclink::test::LogRecord &record)
-                         { told.push_back(record.message); });
+        capture.onRecord([&told](const LogRecord &record) { told.push_back(record.message); });
         write(logger, 0x02, "second");
         EXPECT_THAT(told, ElementsAre("second"));
         EXPECT_THAT(capture.messages(), ElementsAre("second"));
@@ -72,15 +70,15 @@ TEST(LogCapture, TellsOfEachRecordForgetsOnRequestAndPutsBackTheSeverities)
 TEST(Text, GoesBothWaysWithoutLoss)
 {
     const std::string bytes = "a/\xc3\xa9\xff \xf0\x9f\x98\x80";
-    EXPECT_EQ(vclink::test::asUtf8(vclink::test::asUtf16(bytes)), bytes);
-    EXPECT_EQ(vclink::test::asBytes(vclink::test::asPath(bytes)), bytes);
-    EXPECT_EQ(vclink::test::asUtf16("\xc3\xa9"), u"\u00e9");
-    EXPECT_THAT(vclink::test::asPaths({"a", "b"}), ElementsAre(upath(u"a"), upath(u"b")));
+    EXPECT_EQ(asUtf8(asUtf16(bytes)), bytes);
+    EXPECT_EQ(asBytes(asPath(bytes)), bytes);
+    EXPECT_EQ(asUtf16("\xc3\xa9"), u"\u00e9");
+    EXPECT_THAT(asPaths({"a", "b"}), ElementsAre(upath(u"a"), upath(u"b")));
 }
 
 TEST(TestInteractor, PassesOnARequestToCancelAndWhatIsRaisedAndRemembersProgress)
 {
-    vclink::test::TestInteractor interactor;
+    TestInteractor interactor;
     vclink::PollableTerminator poller(interactor.getTerminator());
     EXPECT_FALSE(poller.checkAndResetCancelledState());
     interactor.cancel();

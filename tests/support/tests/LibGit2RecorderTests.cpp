@@ -18,17 +18,14 @@ namespace
 
 using testing::ElementsAre;
 using testing::IsEmpty;
-using vclink::test::injectedText;
-using vclink::test::LibGit2Fault;
-using vclink::test::LibGit2Recorder;
-using vclink::test::When;
+using namespace vclink::test;
 
 static_assert(vclink::test::detail::nameOf<git_libgit2_init>() == "git_libgit2_init");
 static_assert(vclink::test::detail::nameOf<git_checkout_tree>() == "git_checkout_tree");
 static_assert(vclink::test::detail::nameOf<&git_repository_free>() == "git_repository_free");
 
 /// Calls libgit2 as the library does, in a repository with one untracked file.
-class LibGit2RecorderTest : public vclink::test::GitFixture
+class LibGit2RecorderTest : public GitFixture
 {
   protected:
     LibGit2RecorderTest()
@@ -67,8 +64,8 @@ class LibGit2RecorderTest : public vclink::test::GitFixture
         return code;
     }
 
-    vclink::test::GitRepository repository_ = makeRepository();
-    vclink::test::LibGit2Session session_{environment()};
+    GitRepository repository_ = makeRepository();
+    LibGit2Session session_{environment()};
 };
 
 TEST_F(LibGit2RecorderTest, NotesTheCallsInOrder)

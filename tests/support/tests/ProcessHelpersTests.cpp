@@ -21,9 +21,7 @@
 namespace
 {
 
-using vclink::test::NoDescriptorLeak;
-using vclink::test::openDescriptors;
-using vclink::test::runAsUnprivilegedUser;
+using namespace vclink::test;
 using namespace std::chrono_literals;
 
 TEST(NoDescriptorLeak, FailsTheTestThatLeavesOneOpen)
@@ -45,7 +43,7 @@ TEST(NoDescriptorLeak, FailsTheTestThatLeavesOneOpen)
 
 TEST(UnprivilegedUser, IsRefusedWhatRootIsNot)
 {
-    const vclink::test::TemporaryFolder folder;
+    const TemporaryFolder folder;
     std::ofstream(folder / "secret") << "text";
     std::filesystem::permissions(folder / "secret", std::filesystem::perms::none);
     const auto answer = runAsUnprivilegedUser(
@@ -55,7 +53,7 @@ TEST(UnprivilegedUser, IsRefusedWhatRootIsNot)
 
 TEST(UnprivilegedUser, CannotTakeThePrivilegesBackAndIsInNoGroupOfRoots)
 {
-    const int groups = vclink::test::runsAsRoot() ? 0 : ::getgroups(0, nullptr);
+    const int groups = runsAsRoot() ? 0 : ::getgroups(0, nullptr);
     const auto answer = runAsUnprivilegedUser(
         [groups]() -> std::string
         {
@@ -70,11 +68,11 @@ TEST(UnprivilegedUser, CannotTakeThePrivilegesBackAndIsInNoGroupOfRoots)
 
 TEST(UnprivilegedUser, MayBeGivenATree)
 {
-    const vclink::test::TemporaryFolder folder;
+    const TemporaryFolder folder;
     std::filesystem::create_directory(folder / "tree");
     std::ofstream(folder / "tree/file") << "text";
     std::filesystem::create_symlink("/nonexistent", folder / "tree/link");
-    vclink::test::giveToUnprivilegedUser(folder / "tree");
+    giveToUnprivilegedUser(folder / "tree");
     const auto answer = runAsUnprivilegedUser(
         [&]() -> std::string
         {
@@ -114,7 +112,7 @@ TEST(UnprivilegedUser, WaitsNoLongerThanAllowed)
 
 TEST(UnprivilegedUser, LeavesTheParentsExitHandlersAlone)
 {
-    const vclink::test::TemporaryFolder folder;
+    const TemporaryFolder folder;
     static std::string mark;
     mark = folder / "mark";
     std::atexit([] { std::ofstream{mark} << "x"; });

@@ -17,8 +17,7 @@ namespace
 
 using vclink::git::ChildStatus;
 using vclink::git::isChildStatusKept;
-using vclink::test::hasChildren;
-using vclink::test::SignalAction;
+using namespace vclink::test;
 
 /// A child that ends when it is told to, and is waited for at the latest at the end.
 class Child

@@ -21,8 +21,7 @@ namespace
 {
 
 using vclink::git::FailedStartCleanup;
-using vclink::test::DescriptorLimit;
-using vclink::test::hasChildren;
+using namespace vclink::test;
 
 /// The two ends of a pipe, closed at the end unless they are closed already.
 class FailedStartCleanupTest : public testing::Test

@@ -28,11 +28,9 @@ namespace
 
 using boost::process::process_error;
 using vclink::git::runCommand;
-using vclink::test::DescriptorLimit;
-using vclink::test::NothingLeft;
-using vclink::test::RunOutcome;
+using namespace vclink::test;
 
-class RunCommandFailure : public vclink::test::RunCommandFixture
+class RunCommandFailure : public RunCommandFixture
 {
   protected:
     int errorOf(const std::string &command) const
@@ -173,13 +171,13 @@ std::string runWithoutAnotherProcess()
 
 TEST_F(RunCommandFailure, OfTheForkIsAnErrorAndLeavesTheOtherChildren)
 {
-    EXPECT_EQ(vclink::test::runAsUnprivilegedUser(runWithoutAnotherProcess), "");
+    EXPECT_EQ(runAsUnprivilegedUser(runWithoutAnotherProcess), "");
 }
 
 TEST_F(RunCommandFailure, OfThePipeIsAnErrorWithoutARecord)
 {
     useEveryKindOfObject();
-    const vclink::test::LogCapture log(0x08);
+    const LogCapture log(0x08);
     std::error_code code;
     try
     {
@@ -236,16 +234,16 @@ TEST_F(RunCommandFailure, EndsACommandThatAnExceptionLeaves)
         scripts_.shell("echo $$ >" + identity + "; echo; while :; do sleep 60; done");
     {
         const NothingLeft check(environment().temporary());
-        vclink::test::LogCapture log(0x08);
+        LogCapture log(0x08);
         log.onRecord(
-            [](const vclink::test::LogRecord &record)
+            [](const LogRecord &record)
             {
                 if (record.message.compare(0, 8, "Output:\n") == 0)
                     throw std::domain_error("sink");
             });
         EXPECT_THROW(static_cast<void>(runCommand(program, {})), std::domain_error);
     }
-    const std::string process = vclink::test::Scripts::read(identity);
+    const std::string process = Scripts::read(identity);
     ASSERT_FALSE(process.empty());
     EXPECT_EQ(::kill(std::stoi(process), 0), -1);
     EXPECT_EQ(errno, ESRCH);
@@ -256,10 +254,10 @@ TEST_F(RunCommandFailure, StartsNothingWhenTheRecordOfTheCommandFails)
     const NothingLeft check(environment().temporary());
     const std::string mark = scripts_.folder() / "mark";
     const std::string program = scripts_.shell("echo started >" + mark);
-    vclink::test::LogCapture log(0x08);
-    log.onRecord([](const vclink::test::LogRecord &) { throw std::domain_error("sink"); });
+    LogCapture log(0x08);
+    log.onRecord([](const LogRecord &) { throw std::domain_error("sink"); });
     EXPECT_THROW(static_cast<void>(runCommand(program, {})), std::domain_error);
-    EXPECT_EQ(vclink::test::Scripts::read(mark), "");
+    EXPECT_EQ(Scripts::read(mark), "");
 }
 
 } // namespace

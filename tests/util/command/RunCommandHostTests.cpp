@@ -30,14 +30,9 @@ namespace
 
 namespace fs = std::filesystem;
 using vclink::git::runCommand;
-using vclink::test::NothingLeft;
-using vclink::test::NoWorkingFolder;
-using vclink::test::SignalAction;
-using vclink::test::ThousandDescriptors;
+using namespace vclink::test;
 
-class RunCommandHost : public vclink::test::RunCommandFixture
-{
-};
+using RunCommandHost = RunCommandFixture;
 
 TEST_F(RunCommandHost, ThatIgnoresItsChildrenStartsNothing)
 {
@@ -200,16 +195,16 @@ TEST_F(RunCommandHost, MayStartAnotherCommandMeanwhileThatDoesNotHoldTheOutput)
     const std::string quick = scripts_.shell("echo x\n" + waitUntilRead() + "\nexit 1");
     std::future<int> slowResult;
     std::atomic<int> end{-1};
-    vclink::test::LogCapture log(0x08);
+    LogCapture log(0x08);
     log.onRecord(
-        [&](const vclink::test::LogRecord &record)
+        [&](const LogRecord &record)
         {
             // The quick one has its pipe and is about to start.
             if (record.message != "Command: " + quick)
                 return;
             // Not by the library, which would wait for the log that this holds.
-            slowResult = std::async(std::launch::async, [&slow]
-                                    { return vclink::test::Command({slow}).run().exitStatus; });
+            slowResult = std::async(std::launch::async,
+                                    [&slow] { return Command({slow}).run().exitStatus; });
             // Blocks until the slow one waits.
             end = ::open(gate.c_str(), O_WRONLY | O_CLOEXEC);
         });

@@ -13,9 +13,7 @@
 namespace
 {
 
-class RunCommandReading : public vclink::test::RunCommandFixture
-{
-};
+using RunCommandReading = vclink::test::RunCommandFixture;
 
 TEST_F(RunCommandReading, EndsAtTheFirstEmptyLine)
 {

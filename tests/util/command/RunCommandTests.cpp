@@ -20,12 +20,9 @@ namespace
 {
 
 using testing::ElementsAre;
-using vclink::test::Scripts;
-using vclink::test::WorkingFolder;
+using namespace vclink::test;
 
-class RunCommand : public vclink::test::RunCommandFixture
-{
-};
+using RunCommand = RunCommandFixture;
 
 TEST_F(RunCommand, GivesTheExitStatus)
 {
@@ -123,7 +120,7 @@ TEST_F(RunCommand, GivesTheCommandItsOutputAndNoOtherPipe)
     const std::string program = scripts_.shell(
         "for number in /proc/$$/fd/*; do readlink $number; done >" + out + "; exit 0");
     std::set<std::string> before;
-    for (const auto &descriptor : vclink::test::openDescriptors())
+    for (const auto &descriptor : openDescriptors())
         before.insert(descriptor.second);
     EXPECT_EQ(resultOf(program), 0);
     std::set<std::string> pipes;
@@ -141,12 +138,12 @@ TEST_F(RunCommand, LosesStandardErrorAtEveryLoggingLevel)
     EXPECT_EQ(outputOf("echo lost >&2; echo kept"), "kept");
     // The record of the command names the script, not what it prints.
     const std::string program = scripts_.shell("cat >&2 <<END\nlost\nEND\n" + waitUntilRead());
-    std::vector<unsigned> masks{0, vclink::test::LogCapture::allSeverities};
+    std::vector<unsigned> masks{0, LogCapture::allSeverities};
     for (unsigned bit = 1; bit != 0; bit <<= 1)
         masks.push_back(bit);
     for (const unsigned mask : masks)
     {
-        const vclink::test::LogCapture log(mask);
+        const LogCapture log(mask);
         testing::internal::CaptureStdout();
         testing::internal::CaptureStderr();
         EXPECT_EQ(resultOf(program), 0);

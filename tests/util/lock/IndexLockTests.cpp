@@ -30,10 +30,7 @@ using git::IndexLock;
 using testing::ElementsAre;
 using testing::HasSubstr;
 using testing::UnorderedElementsAre;
-using vclink::test::asPath;
-using vclink::test::Failure;
-using vclink::test::failureOf;
-using vclink::test::GitRepository;
+using namespace vclink::test;
 
 struct stat statusOf(const fs::path &file)
 {
@@ -43,7 +40,7 @@ struct stat statusOf(const fs::path &file)
     return status;
 }
 
-class IndexLockTest : public vclink::test::GitFixture
+class IndexLockTest : public GitFixture
 {
   protected:
     IndexLockTest()
@@ -88,7 +85,7 @@ class IndexLockTest : public vclink::test::GitFixture
         return repository_.git({"ls-files"});
     }
 
-    vclink::test::LibGit2Session session_{environment()};
+    LibGit2Session session_{environment()};
     GitRepository repository_ = makeRepository();
 };
 
@@ -345,8 +342,8 @@ TEST_F(IndexLockTest, IsGivenUpWhereTheIndexCannotBeRead)
 TEST_F(IndexLockTest, IsGivenUpWhereTheIndexMayNotBeRead)
 {
     repository_.setMode(".git/index", 0000);
-    vclink::test::giveToUnprivilegedUser(folder().path());
-    const std::string text = vclink::test::runAsUnprivilegedUser(
+    giveToUnprivilegedUser(folder().path());
+    const std::string text = runAsUnprivilegedUser(
         [&]
         {
             const auto opened = open(repository_);
@@ -387,10 +384,10 @@ TEST_F(IndexLockTest, LeavesTheModeThatLibGit2Gives)
 TEST_F(IndexLockTest, LeavesNoDescriptorOpenAndHandsNoneOn)
 {
     const auto opened = open(repository_);
-    const vclink::test::NoDescriptorLeak noLeak;
+    const NoDescriptorLeak noLeak;
     {
         const IndexLock lock(opened.get());
-        for (const auto &[descriptor, file] : vclink::test::openDescriptors())
+        for (const auto &[descriptor, file] : openDescriptors())
         {
             if (fs::path(file).filename() == "index.vclink")
             {

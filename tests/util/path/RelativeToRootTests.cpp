@@ -22,8 +22,7 @@ namespace
 namespace fs = std::filesystem;
 using vclink::git::relativeToRoot;
 using vclink::git::RootRelativePaths;
-using vclink::test::asPath;
-using vclink::test::asUtf8;
+using namespace vclink::test;
 
 /// What the operation is defined by, as Boost 1.74 does it: later releases keep a separator at the
 /// end.
@@ -39,14 +38,14 @@ std::string oracle(const std::string &root, const std::string &path)
     return text;
 }
 
-class RelativeToRoot : public vclink::test::GitFixture
+class RelativeToRoot : public GitFixture
 {
   protected:
     RelativeToRoot()
     {
         for (const auto *made : {"root/sub/dir", "root/back\\slash", "other/deep"})
             fs::create_directories(folder() / made);
-        const auto files = vclink::test::GitRepository(folder().path());
+        const auto files = GitRepository(folder().path());
         for (const auto *file : {"root/file", "root/sub/file", "root/sub/dir/file", "other/file",
                                  "root/x\\y", "root/\xFF", "root/gr\xC3\xBC\xC3\x9F"})
             files.write(file, "x");
@@ -200,7 +199,7 @@ TEST_F(RelativeToRoot, NeedsNoWorkingFolderForAbsolutePaths)
         std::vector<std::string> expected;
         for (const std::string &path : shapes())
             expected.push_back(relative(root, path));
-        const vclink::test::NoWorkingFolder gone(folder().path());
+        const NoWorkingFolder gone(folder().path());
         for (std::size_t i = 0; i < shapes().size(); ++i)
             EXPECT_EQ(relative(root, shapes()[i]), expected[i]) << root << " and " << shapes()[i];
         EXPECT_THROW(relative(root, "root/loop"), boost::filesystem::filesystem_error);

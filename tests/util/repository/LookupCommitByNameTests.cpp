@@ -14,10 +14,9 @@ namespace
 {
 
 namespace git = vclink::git;
-using vclink::test::asPath;
-using vclink::test::GitRepository;
+using namespace vclink::test;
 
-class LookupCommitByName : public vclink::test::GitFixture
+class LookupCommitByName : public GitFixture
 {
   protected:
     git::OwnedHandle<git_repository> open() const
@@ -29,7 +28,7 @@ class LookupCommitByName : public vclink::test::GitFixture
         const auto opened = open();
         const auto result = git::lookupCommitByName(name, opened.get());
         return result.has_value() ? git_oid_tostr_s(git_commit_id(result.value().get()))
-                                  : vclink::test::asUtf8(result.error().getMessage());
+                                  : asUtf8(result.error().getMessage());
     }
     int errorOf(const char *name) const
     {
@@ -38,7 +37,7 @@ class LookupCommitByName : public vclink::test::GitFixture
         return result.has_error() ? result.error().getCode() : 0;
     }
 
-    vclink::test::LibGit2Session session_{environment()};
+    LibGit2Session session_{environment()};
     GitRepository repository_ = makeRepository();
 };
 
@@ -113,7 +112,7 @@ TEST_F(LookupCommitByName, LeavesNothingOpen)
 {
     repository_.commit("first");
     idOf("HEAD");
-    const vclink::test::NoDescriptorLeak noLeak;
+    const NoDescriptorLeak noLeak;
     EXPECT_NE(idOf("HEAD"), "");
     EXPECT_EQ(errorOf("missing"), GIT_ENOTFOUND);
 }

@@ -16,16 +16,14 @@ namespace
 {
 
 namespace git = vclink::git;
-using vclink::test::asPath;
-using vclink::test::failureOf;
-using vclink::test::GitRepository;
+using namespace vclink::test;
 
 std::string asHex(const git_oid &id)
 {
     return git_oid_tostr_s(&id);
 }
 
-class RepositoryHelpers : public vclink::test::GitFixture
+class RepositoryHelpers : public GitFixture
 {
   protected:
     git::OwnedHandle<git_repository> open(const GitRepository &repository) const
@@ -33,7 +31,7 @@ class RepositoryHelpers : public vclink::test::GitFixture
         return git::openRepository(asPath(repository.path()));
     }
 
-    vclink::test::LibGit2Session session_{environment()};
+    LibGit2Session session_{environment()};
 };
 
 TEST_F(RepositoryHelpers, OpenANewHandleOfTheFoldersRepositoryEachTimeAndNothingAboveIt)
@@ -41,7 +39,7 @@ TEST_F(RepositoryHelpers, OpenANewHandleOfTheFoldersRepositoryEachTimeAndNothing
     const auto repository = makeRepository("gr\xC3\xBC\xC3\x9F \xFF");
     repository.makeFolder("sub");
     open(repository);
-    const vclink::test::NoDescriptorLeak noLeak;
+    const NoDescriptorLeak noLeak;
     const auto first = open(repository);
     const auto second = open(repository);
     EXPECT_NE(first.get(), second.get());

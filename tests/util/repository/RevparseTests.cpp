@@ -14,13 +14,12 @@ namespace
 {
 
 namespace git = vclink::git;
-using vclink::test::asPath;
-using vclink::test::failureOf;
+using namespace vclink::test;
 
 /// Too large for libgit2's cache of objects, which frees what it refuses at once.
 const std::string longText(9000, 'x');
 
-class Revparse : public vclink::test::GitFixture
+class Revparse : public GitFixture
 {
   protected:
     Revparse()
@@ -45,8 +44,8 @@ class Revparse : public vclink::test::GitFixture
         return git_oid_tostr_s(&id);
     }
 
-    vclink::test::LibGit2Session session_{environment()};
-    vclink::test::GitRepository repository_ = makeRepository();
+    LibGit2Session session_{environment()};
+    GitRepository repository_ = makeRepository();
     git::OwnedHandle<git_repository> opened_;
 };
 
