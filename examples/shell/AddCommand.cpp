@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: MIT
+#include <algorithm>
 #include <filesystem>
 #include <system_error>
 #include <vector>
@@ -139,7 +140,7 @@ class AddCommand : public Command
         {
             return say("it is a repository of its own: use \"%1%\"", "git submodule add");
         }
-        const std::string reason = explainLink(named, "git add");
+        std::string reason = explainLink(named, "git add");
         const auto own = named.states.find(named.path);
         if (!reason.empty() || named.isFolder || own == named.states.end())
         {

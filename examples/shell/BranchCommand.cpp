@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: MIT
+#include <optional>
 #include <string>
 
 #include <CLI/CLI.hpp>

@@ -1,5 +1,7 @@
 // SPDX-License-Identifier: MIT
+#include <filesystem>
 #include <string>
+#include <system_error>
 #include <vector>
 
 #include "Output.hpp"
