@@ -55,6 +55,7 @@ void CheckoutWatch::passProgress(const char *path, std::size_t completed, std::s
 {
     auto &watch = *static_cast<CheckoutWatch *>(payload);
     watch.remade_.remove();
+    watch.cleared_.removeNoted();
     if (watch.progress_ != nullptr)
     {
         watch.progress_(path, completed, total, watch.progressPayload_);
@@ -201,13 +202,20 @@ Finding CheckoutWatch::clearAll(const CheckoutNotice &notice)
     {
         return inTheWay(name, standing);
     }
-    const bool isFolder = standing == Standing::Folder && isPast && !isSubmodule;
-    if (isFolder || standing == Standing::Link || standing == Standing::Special)
+    if (standing == Standing::Link || standing == Standing::Special)
     {
         cleared_.remove(root_ + name);
     }
-    return isFolder && standingAt(root_ + name) == Standing::Folder ? inTheWay(name, standing)
-                                                                    : Finding();
+    const bool isFolder = standing == Standing::Folder && isPast && !isSubmodule;
+    if (isFolder && !isEmptyFolder(root_ + name))
+    {
+        return inTheWay(name, standing);
+    }
+    if (isFolder)
+    {
+        cleared_.removeLater(root_ + name);
+    }
+    return {};
 }
 
 } // namespace vclink::git

@@ -2,6 +2,7 @@
 #include "main/checkout/ClearedWay.hpp"
 
 #include <cerrno>
+#include <utility>
 
 #include <sys/stat.h>
 #include <unistd.h>
@@ -39,6 +40,29 @@ void ClearedWay::remove(const std::string &path)
     {
         raiseSystemError(error, "could not remove '" + path + "'");
     }
+}
+
+void ClearedWay::removeLater(const std::string &path)
+{
+    struct stat status = {};
+    if (::lstat(path.c_str(), &status) == 0 && S_ISDIR(status.st_mode))
+    {
+        noted_.push_back({path, status.st_mode, ""});
+        removed_.reserve(removed_.size() + noted_.size());
+    }
+}
+
+void ClearedWay::removeNoted() noexcept
+{
+    for (Removed &noted : noted_)
+    {
+        if (::rmdir(noted.path.c_str()) == 0)
+        {
+            // There is room for it.
+            removed_.push_back(std::move(noted));
+        }
+    }
+    noted_.clear();
 }
 
 /// Fails if something else is in the place, and keeps that: after a checkout this is so in every

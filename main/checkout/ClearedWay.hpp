@@ -25,6 +25,12 @@ class ClearedWay
     /// @throws LibGit2Exception if it cannot be removed
     void remove(const std::string &path);
 
+    /// Notes an empty folder that libgit2 may still be about to read.
+    /// @param path absolute
+    void removeLater(const std::string &path);
+    /// Removes the noted folders. Call it right before the checkout writes.
+    void removeNoted() noexcept;
+
   private:
     struct Removed
     {
@@ -35,6 +41,7 @@ class ClearedWay
     static void putBack(const Removed &removed);
 
     std::vector<Removed> removed_;
+    std::vector<Removed> noted_;
 };
 
 } // namespace vclink::git

@@ -87,7 +87,7 @@ std::string RemadeFiles::note(const std::string &path, bool isExecutable)
         raiseUnexamined(error, path);
     }
     const bool isRemade = error != 0 || status.st_nlink != 1;
-    // libgit2 itself makes such a file anew.
+    // libgit2 itself creates such a file again.
     const bool isExchanged = ((status.st_mode & S_IXUSR) != 0) != isExecutable;
     if ((isRemade || isExchanged) && !isRemovable(path, status))
     {

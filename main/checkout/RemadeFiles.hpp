@@ -11,15 +11,15 @@ namespace vclink::git
 /// @param path absolute
 bool mustBeRemade(const std::string &path);
 
-/// The files that a checkout overwrites, and makes anew as git does. libgit2 writes into the
+/// The files that a checkout overwrites, and creates again, as git does. libgit2 writes into the
 /// existing file. If it has other names, it changes under all of them, even in other folders. If it
 /// cannot be opened for writing, because it is read-only, another user's or a running program,
 /// libgit2 stops in the middle of its writing.
 class RemadeFiles
 {
   public:
-    /// Notes a file if it must be made anew. Call it for each file before the checkout writes the
-    /// first one.
+    /// Notes a file if it must be created again. Call it for each file before the checkout writes
+    /// the first one.
     /// @param path absolute; if there is no file, only the folders above are looked at
     /// @param isExecutable what the checkout makes of it
     /// @return empty, or why the checkout cannot write the file

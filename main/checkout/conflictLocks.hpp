@@ -29,7 +29,8 @@ Finding findLockOfConflict(git_repository *repository, WorkingCopy &copy, const 
 Finding findLockBesideFile(WorkingCopy &copy, const TreeChange &change, const git_tree *theirs);
 
 /// The same rule for a file that one side has renamed and the other has changed. There it also
-/// finds folders that cannot be written to, because libgit2 removes the file and makes it anew.
+/// finds folders that cannot be written to, because libgit2 removes the file and
+/// creates it again.
 class RenamedLocks
 {
   public:

@@ -77,15 +77,15 @@ Finding findSubmoduleAfterSibling(WorkingCopy &copy, const TreeChange &change);
 /// would delete it, because HEAD still has it.
 Finding findUntrackedOfHead(WorkingCopy &copy, const TreeChange &change);
 /// Finds a folder that cannot be written to around a file that both sides have changed. libgit2
-/// removes a file in conflict, and makes it anew.
+/// removes a file in conflict, and creates it again.
 Finding findUnwritableFolderOfConflict(WorkingCopy &copy, const TreeChange &change);
 /// Finds a new file of the other side whose name differs from one of ours only in case, if the
 /// other side has ours too, and `core.ignorecase` is set. libgit2 keeps only one of them.
 /// @param theirs the other side's tree
 Finding findOtherCase(WorkingCopy &copy, const TreeChange &change, const git_tree *theirs);
 /// Finds what is removed for a new file if libgit2 reports it before it writes: an ignored link in
-/// its place, an ignored file that must be made anew, an ignored link or file above. For changes to
-/// which the other rules of a merge do not object.
+/// its place, an ignored file that must be created again, an ignored link or file above. For
+/// changes to which the other rules of a merge do not object.
 Finding findYielding(WorkingCopy &copy, const TreeChange &change);
 /// Returns true if neither side has the file any more. If they have renamed it, it is in conflict,
 /// and libgit2 writes the file of the new name without reporting it.

@@ -80,6 +80,18 @@ bool visitFolder(const std::string &path, const std::function<bool(const std::st
     return errno == 0;
 }
 
+bool isEmptyFolder(const std::string &path)
+{
+    bool isEmpty = true;
+    const bool isRead = visitFolder(path,
+                                    [&isEmpty](const std::string &)
+                                    {
+                                        isEmpty = false;
+                                        return false;
+                                    });
+    return isRead && isEmpty;
+}
+
 std::string unwritableFolderAbove(const std::string &path)
 {
     std::string folder = path.substr(0, path.rfind('/') + 1);

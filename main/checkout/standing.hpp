@@ -39,6 +39,10 @@ bool visitFolder(const std::string &path, const std::function<bool(const std::st
 /// @param path absolute
 std::string unwritableFolderAbove(const std::string &path);
 
+/// Returns true if the folder can be read and contains nothing.
+/// @param path absolute
+bool isEmptyFolder(const std::string &path);
+
 /// Returns the target of a link, empty if it cannot be read.
 /// @param path absolute
 std::string readLink(const std::string &path);

@@ -126,7 +126,7 @@ struct Search
     bool isTaken = false;
 };
 
-/// Returns true if the file is in ours as in all bases. Where these differ, a merge can decide for
+/// Returns true if the file is in ours as in all bases. If these differ, a merge can decide for
 /// ours.
 bool isUntouched(const Search &search, const char *path, const File &before, const File &ours)
 {

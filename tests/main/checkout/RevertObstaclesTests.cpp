@@ -165,6 +165,21 @@ TEST_F(RevertObstacles, FoldersInThePlaceOfAFileAreReplacedAsGitDoes)
     expectRevertsAsGit({"file", "other", "zlast"});
 }
 
+/// libgit2 reads the folder after it has reported the file.
+TEST_F(RevertObstacles, EmptyFoldersInThePlaceOfAFileAreReplacedWhateverItsName)
+{
+    for (const std::string name : {"!d/file", "#d/file", "d/file"})
+    {
+        repository_.commitAll(writes(name, name) + writes("zlast", name), name);
+        repository_.remove(name);
+        repository_.makeFolder(name);
+        repository_.write("zlast", "mine");
+        revert({name, "zlast"});
+        EXPECT_EQ(repository_.read(name), name);
+        EXPECT_EQ(repository_.read("zlast"), name);
+    }
+}
+
 TEST_F(RevertObstacles, FilesInThePlaceOfAFolderAreReplacedAsGitDoes)
 {
     repository_.git({"reset", "--quiet", "--hard"});

@@ -191,7 +191,7 @@ TEST_F(UnwritableFiles, InAFolderThatCannotBeWrittenToAreRefused)
     EXPECT_FALSE(fs::exists(repository_ / "n"));
 }
 
-/// libgit2 makes such a file anew.
+/// libgit2 creates such a file again.
 TEST_F(UnwritableFiles, ThatChangeTheirPermissionsInSuchAFolderAreRefused)
 {
     makeBranch("topic", changesAll_ + makesExecutable("d/r"));
@@ -204,7 +204,7 @@ TEST_F(UnwritableFiles, ThatChangeTheirPermissionsInSuchAFolderAreRefused)
     EXPECT_FALSE(fs::exists(repository_ / "n"));
 }
 
-/// libgit2 removes each file in conflict, and makes it anew.
+/// libgit2 removes each file in conflict, and creates it again.
 TEST_F(UnwritableFiles, InConflictInSuchAFolderAreRefused)
 {
     diverge(writesEach({"a", "d/r"}, "ours\n"), changesAll_);
