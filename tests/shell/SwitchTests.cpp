@@ -193,10 +193,9 @@ class ShellInterruptOfBranches : public ShellMergeFixture
     /// A script that runs the program, as "$0", and is interrupted when this has appeared.
     int interrupt(const std::string &script, const std::string &sign, std::string &text) const
     {
-        TerminalProcess process({"env", "TERM=xterm",
-                                 "LSAN_OPTIONS=print_suppressions=0:suppressions=" //
-                                 VCLINK_LEAK_SUPPRESSIONS,
-                                 "sh", "-c", script, VCLINK_SHELL},
+        const std::string leaks =
+            "LSAN_OPTIONS=print_suppressions=0:suppressions=" VCLINK_LEAK_SUPPRESSIONS;
+        TerminalProcess process({"env", "TERM=xterm", leaks, "sh", "-c", script, VCLINK_SHELL},
                                 repository_.path());
         process.readUntil(sign);
         process.interrupt();
