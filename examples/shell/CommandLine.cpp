@@ -257,7 +257,7 @@ const CLI::App *CommandLine::parsedCommand() const
 std::string CommandLine::describe(const CLI::ParseError &error) const
 {
     // What is not known comes first: it may be why something else is missing.
-    const std::string extra = describeExtra();
+    std::string extra = describeExtra();
     if (!extra.empty())
     {
         return extra;
@@ -289,7 +289,7 @@ std::string CommandLine::describeExtra() const
     {
         const std::string instead =
             command == nullptr ? "" : suggestInstead(command->get_name(), first);
-        const std::string place = describePlace(command, first);
+        std::string place = describePlace(command, first);
         if (!place.empty())
         {
             return place;
