@@ -12,7 +12,6 @@ namespace
 {
 
 using testing::ElementsAre;
-using testing::HasSubstr;
 using testing::StartsWith;
 
 const std::vector<std::string> oddNames{"{}",     "++",         "a,b",       "quo\"te",

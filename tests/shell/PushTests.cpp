@@ -9,7 +9,6 @@ namespace
 {
 
 using testing::HasSubstr;
-using testing::StartsWith;
 
 class ShellPush : public ShellRemoteFixture
 {

@@ -65,7 +65,7 @@ struct AttributeRows : Sentence
 {
     std::string text;
     std::vector<std::array<std::string, 3>> answers;
-    std::string folder = "";
+    std::string folder = {};
 };
 
 class AttributesOfAFile : public GitAttributesTest,

@@ -13,6 +13,7 @@
 
 #include "MergeFixture.hpp"
 #include "support/Command.hpp"
+#include "support/text.hpp"
 
 namespace
 {
