@@ -39,17 +39,18 @@ bool isInAll(const Bases &bases, const std::string &path, const git_tree_entry *
 }
 
 /// @param change from our side to theirs
-Finding findFileAndFolder(const WorkingCopy &copy, const TreeChange &change, const git_tree *theirs)
+Finding findLinkAndFolder(const WorkingCopy &copy, const TreeChange &change, const git_tree *theirs)
 {
-    const git_tree_entry *const file = change.before != nullptr ? change.before : change.after;
+    const git_tree_entry *const link = change.before != nullptr ? change.before : change.after;
     const git_tree *const other = change.before != nullptr ? theirs : copy.head();
     const bool isOneSided = change.before == nullptr || change.after == nullptr;
-    if (!isOneSided || isGitlink(file) || !isFolder(other, change.path))
+    if (!isOneSided || git_tree_entry_filemode(link) != GIT_FILEMODE_LINK ||
+        !isFolder(other, change.path))
     {
         return {};
     }
     return Obstacle{change.path, "'" + change.path +
-                                     "' is a file of one side and a folder of the other, and there "
+                                     "' is a link of one side and a folder of the other, and there "
                                      "are several merge bases: merge with 'git merge'"};
 }
 
@@ -65,7 +66,7 @@ Finding findBetweenSides(git_repository *repository, WorkingCopy &copy,
                          found = findLockBesideFile(copy, change, theirs);
                          if (!found)
                          {
-                             found = findFileAndFolder(copy, change, theirs);
+                             found = findLinkAndFolder(copy, change, theirs);
                          }
                          const bool isClean =
                              found && (isInAll(bases, change.path, change.before) ||

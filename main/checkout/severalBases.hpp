@@ -14,8 +14,8 @@ namespace vclink::git
 
 /// Compares both sides of a merge with several merge bases. libgit2 first merges the bases,
 /// possibly with conflicts, so that no base alone shows what conflicts then. Finds a file that
-/// differs if its name with `.lock` appended is taken, and a file of one side that is a folder of
-/// the other, unless all bases have the file as one of the sides.
+/// differs if its name with `.lock` appended is taken, and a link of one side that is a folder of
+/// the other, unless all bases have the file or link as one of the sides.
 /// @param theirs the other side's tree
 /// @throws LibGit2Exception
 Finding findBetweenSides(git_repository *repository, WorkingCopy &copy,

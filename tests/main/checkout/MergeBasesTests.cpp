@@ -74,13 +74,13 @@ TEST_F(MergeBases, TogetherCanMakeAConflictBesideALock)
         "the conflict in 'x' cannot be written beside 'x.lock': merge with 'git merge'");
 }
 
-TEST_F(MergeBases, TogetherCanMakeAConflictOfAFileAndAFolder)
+TEST_F(MergeBases, TogetherCanMakeAConflictOfALinkAndAFolder)
 {
     expectBetweenSides(
         "y",
         [](const std::string &text)
         { return removes("y") + (text == "first\n" ? links("file", "y") : writes("y/z", text)); },
-        "'y' is a file of one side and a folder of the other, and there are several merge bases: "
+        "'y' is a link of one side and a folder of the other, and there are several merge bases: "
         "merge with 'git merge'");
 }
 
