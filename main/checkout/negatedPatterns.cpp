@@ -4,10 +4,12 @@
 #include <cstddef>
 #include <cstdlib>
 #include <fstream>
+#include <memory>
 
 #include <fnmatch.h>
 #include <git2/buffer.h>
 #include <git2/config.h>
+#include <git2/errors.h>
 #include <git2/repository.h>
 
 #include "error/errorUtil/GitResult.hpp"
@@ -66,16 +68,21 @@ bool mayNegate(const std::string &path, const std::string &name)
 }
 
 /// Returns the setting, empty if there is none.
+/// @throws LibGit2Exception if it cannot be read
 std::string excludesFile(git_repository *repository)
 {
-    const auto config = acquire<git_config>(git_repository_config_snapshot, repository);
+    const OwnedHandle<git_config> config =
+        acquire<git_config>(git_repository_config_snapshot, repository).value();
     git_buf path = {};
-    const bool isSet =
-        config.has_value() &&
-        call(git_config_get_path, &path, config.value().get(), "core.excludesfile").has_value();
-    std::string text = isSet ? std::string(path.ptr, path.size) : std::string();
-    git_buf_dispose(&path);
-    return text;
+    const std::unique_ptr<git_buf, void (*)(git_buf *)> owner(&path, git_buf_dispose);
+    const GitResult<void> found =
+        call(git_config_get_path, &path, config.get(), "core.excludesfile");
+    if (found.has_error() && found.error().getCode() == GIT_ENOTFOUND)
+    {
+        return {};
+    }
+    check(found);
+    return {path.ptr, path.size};
 }
 
 std::string inEnvironment(const char *variable, const char *path)

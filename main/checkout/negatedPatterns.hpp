@@ -13,6 +13,7 @@ namespace vclink::git
 /// untracked files for ignored ones. Also returns true if a file with patterns cannot be read.
 /// @param root the working tree, with a slash at its end
 /// @param name relative to the root
+/// @throws LibGit2Exception if `core.excludesFile` cannot be read
 bool mayBeNegated(git_repository *repository, const std::string &root, const std::string &name);
 
 } // namespace vclink::git

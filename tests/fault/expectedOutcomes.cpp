@@ -155,6 +155,8 @@ std::vector<Tolerance> tolerancesOfMerges(const std::string &operation, const st
         {"merge", "git_reference_dwim", 1, any, normal},
         {"merge", "git_reference_dwim", 2, any, isOtherMerge},
         {"merge", "git_commit_lookup", 3, any, isOtherMerge},
+        // There need be no file of patterns.
+        {"mergeOverIgnored", "git_config_get_path", any, GIT_ENOTFOUND, normal},
         // Without its command a driver leaves the file to libgit2's own merge.
         {"mergeByTool", "git_config_get_entry", any, any, hasConflicts},
     };
