@@ -58,7 +58,7 @@ void ClearedWay::removeNoted() noexcept
     {
         if (::rmdir(noted.path.c_str()) == 0)
         {
-            // There is room for it.
+            // Does not allocate: removeLater() has reserved the space.
             removed_.push_back(std::move(noted));
         }
     }

@@ -9,11 +9,11 @@ namespace vclink::git
 {
 
 /// Returns true if a pattern that begins with '!' may exempt a file from being ignored. libgit2
-/// leaves out such a pattern unless it negates another one of the same file, so that it takes
+/// does not apply such a pattern unless it negates another one of the same file, so that it takes
 /// untracked files for ignored ones. Also returns true if a file with patterns cannot be read.
 /// @param root the working tree, with a slash at its end
 /// @param name relative to the root
-/// @throws LibGit2Exception if `core.excludesFile` cannot be read
+/// @throws LibGit2Exception if the setting `core.excludesFile` cannot be read
 bool mayBeNegated(git_repository *repository, const std::string &root, const std::string &name);
 
 } // namespace vclink::git

@@ -85,7 +85,7 @@ std::int32_t timeOf(git_index *index)
                : 0;
 }
 
-/// Returns 0 or the error. An error is tried again once, so that a passing one does not hide a
+/// Returns 0 or the error. After an error tries once more, so that a temporary one does not hide a
 /// file.
 int readStatus(const std::string &path, struct stat &status)
 {

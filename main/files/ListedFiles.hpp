@@ -17,7 +17,7 @@ class ListedFiles
 {
   public:
     /// git_pathspec_new.
-    /// @param index tells whether case matters
+    /// @param index decides whether case matters
     /// @throws LibGit2Exception
     ListedFiles(git_index *index, const git_strarray &listed);
 

@@ -8,9 +8,10 @@ namespace vclink::git
 
 class PathspecArray;
 
-/// Removes from the index, in memory, what is below a file of the index. git cannot commit an index
-/// with both. libgit2 leaves it there when it adds the file, unless the file's pattern also matches
-/// it; a pattern with a wildcard or an escape may not. git_index_remove.
+/// Removes an entry such as `a/b` from the index, in memory, if the index also has the file `a`.
+/// git cannot commit an index with both. When libgit2 adds `a`, it removes only those that the
+/// pattern for `a` matches, and a pattern with a wildcard or an escape may match none.
+/// git_index_remove.
 /// @param pathspec the patterns whose files were added
 /// @return true if there was anything to remove
 /// @throws LibGit2Exception

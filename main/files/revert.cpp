@@ -92,7 +92,7 @@ void resetToHead(git_repository *repository, const git_object *head, const Paths
     raise(shared_vclink::git::Conflicted(vclink::util::generateFileReport(std::move(files))));
 }
 
-/// Raises if one of the listed files is in conflict.
+/// Throws if one of the listed files is in conflict.
 void refuseConflicts(git_index *index, const PathspecArray &pathspec, const upath &root)
 {
     if (git_index_has_conflicts(index) == 0)

@@ -43,7 +43,7 @@ GitResult<OwnedDiff> compare(git_repository *repository, git_index *index,
     return diff;
 }
 
-/// A file that only cannot be seen is not gone.
+/// Returns false for a file that may exist and cannot be examined.
 bool isGone(const std::string &path)
 {
     struct stat status = {};

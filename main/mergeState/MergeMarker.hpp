@@ -12,8 +12,8 @@ namespace vclink::git
 
 /// A file in the repository's folder that exists while libgit2 merges: `vclink-merge`, with the ids
 /// of HEAD and of the merged commit. If the process is killed, the file stays, and shows the next
-/// commit that some of the other side's work may be missing. Meanwhile git's own sign of a complete
-/// merge, `AUTO_MERGE`, is away. An earlier one returns if no merge is under way at the end.
+/// commit that some of the other side's work may be missing. Removes git's own sign of a
+/// complete merge, `AUTO_MERGE`, and restores it if no merge is under way at the end.
 class MergeMarker
 {
   public:

@@ -62,7 +62,7 @@ bool PackedReferences::haveChanged() const noexcept
            now.st_mtim.tv_nsec != noted_.st_mtim.tv_nsec;
 }
 
-/// Of no file if there is none.
+/// Returns zeros if there is no file.
 struct stat PackedReferences::status() const noexcept
 {
     struct stat status = {};

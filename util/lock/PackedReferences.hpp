@@ -12,9 +12,9 @@ namespace vclink::git
 {
 
 /// The file of packed references, and git's lock for it. While it is locked, no other process packs
-/// loose references. A process that has begun to pack a reference writes it even if it is deleted
-/// meanwhile: whoever deletes one looks again under the lock, as git keeps the lock until the
-/// loose one is gone. libgit2 locks the file only while it writes it.
+/// loose references. A process that has begun to pack a reference writes it even if another process
+/// has deleted it since. To delete one, git keeps the lock until the loose reference is gone.
+/// libgit2 locks the file only while it writes it, so look again under the lock after a deletion.
 class PackedReferences
 {
   public:

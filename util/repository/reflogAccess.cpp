@@ -15,7 +15,7 @@ namespace vclink::git
 namespace
 {
 
-/// HEAD is the only one of a working copy; all working copies of a repository share the others.
+/// Each working tree has a reflog of HEAD; all working trees of a repository share the others.
 std::string pathOfReflog(git_repository *repository, const std::string &reference)
 {
     const char *const folder = reference == "HEAD" ? git_repository_path(repository)

@@ -25,7 +25,7 @@ class GitMergeDriverLookup;
 /// one, nor a call of GitAdapterFactory::isAdapterFor. Otherwise that merge ignores the commands,
 /// or the process crashes.
 ///
-/// Starting libgit2 takes 10 to 17 milliseconds of processor time, most of it for the system's
+/// Starting libgit2 takes some milliseconds of processor time, most of it for the system's
 /// certificates. Hold a guard while you probe many folders with GitAdapterFactory::isAdapterFor.
 ///
 /// A guard, or an object that holds one, can be a static object: the log outlives it. If it is put

@@ -246,7 +246,7 @@ TEST_F(RevertObstacles, AreFilesInThePlaceOfASubmodule)
     EXPECT_EQ(workingTreeOf(repository_), before);
 }
 
-/// The states are not known then. The index tells which files are in conflict: none here.
+/// The states are not known then. The index has no file in conflict.
 TEST_F(RevertObstacles, HoldsInARevertWhoseStateWalkFails)
 {
     GitRepository::init(repository_ / "line\nfeed").commit("first");

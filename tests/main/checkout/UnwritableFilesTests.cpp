@@ -25,8 +25,8 @@ namespace fs = std::filesystem;
 using testing::HasSubstr;
 using namespace vclink::test;
 
-/// Tracked files that libgit2 cannot open for writing, between others that it writes. git makes
-/// them anew.
+/// Tracked files that libgit2 cannot open for writing, between others that it writes. git creates
+/// them again.
 class UnwritableFiles : public ObstacleFixture
 {
   protected:

@@ -55,7 +55,7 @@ constexpr EnglishTextOfKey texts[] = {
                 "Git does not know who makes this commit. Set user.name and user.email in the Git "
                 "configuration, and try again."),
     VCLINK_TEXT("InvalidGitAttributeValue",
-                // TRANSLATORS: %1% is the value as it stands in a .gitattributes file.
+                // TRANSLATORS: %1% is the value as it is in a .gitattributes file.
                 "\"%1%\" cannot be understood as the value of a Git attribute."),
 };
 
