@@ -11,8 +11,13 @@ install(DIRECTORY include/
 vclink_install_package_files(vclink_git "${PROJECT_SOURCE_DIR}/cmake/package"
     COMPONENT development)
 
-# The same layout as in the repository, so that links between documents and examples work.
-install(FILES README.md CHANGELOG.md SECURITY.md
+# The same layout as in the repository, so that links between documents and examples work. Links of README.md to
+# files that are not installed become plain text.
+file(READ "${PROJECT_SOURCE_DIR}/README.md" readme)
+string(REGEX REPLACE "\\[([^]]*)\\]\\((CONTRIBUTING\\.md|Containerfile|LICENSE)\\)" "\\1" readme "${readme}")
+file(WRITE "${PROJECT_BINARY_DIR}/package/README.md" "${readme}")
+set_property(DIRECTORY APPEND PROPERTY CMAKE_CONFIGURE_DEPENDS "${PROJECT_SOURCE_DIR}/README.md")
+install(FILES "${PROJECT_BINARY_DIR}/package/README.md" CHANGELOG.md SECURITY.md
     DESTINATION share/doc/libvclink-git-dev
     COMPONENT development)
 install(DIRECTORY docs

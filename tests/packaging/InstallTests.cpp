@@ -5,6 +5,7 @@
 #include <filesystem>
 #include <fstream>
 #include <iterator>
+#include <regex>
 #include <string>
 #include <vector>
 
@@ -111,6 +112,34 @@ TEST_F(Component, DevelopmentIsTheExportedHeadersWhatFindsTheLibraryAndTheDocume
     }
     EXPECT_THAT(filesOf("development"),
                 ElementsAreArray(sorted(with(expected, "libvclink-git-dev"))));
+}
+
+TEST_F(Component, DevelopmentHasDocumentsWhoseLinksLeadToInstalledFiles)
+{
+    const std::regex link("\\]\\(([^)#:]+)[)#]");
+    std::vector<std::string> missing;
+    std::size_t count = 0;
+    for (const auto &name : filesOf("development"))
+    {
+        const std::filesystem::path page = folder() / "prefix" / name;
+        if (page.extension() != ".md")
+        {
+            continue;
+        }
+        std::ifstream stream(page);
+        const std::string text(std::istreambuf_iterator<char>(stream), {});
+        for (std::sregex_iterator found(text.begin(), text.end(), link), end; found != end; ++found)
+        {
+            const std::string target = (*found)[1];
+            ++count;
+            if (!std::filesystem::exists(page.parent_path() / target))
+            {
+                missing.push_back(name + ": " + target);
+            }
+        }
+    }
+    EXPECT_THAT(missing, testing::IsEmpty());
+    EXPECT_GT(count, 100U);
 }
 
 TEST_F(Component, HostRuntimeIsTheStandInWithItsCatalogueAndLaunchers)
