@@ -59,7 +59,7 @@ std::string GitException::GetID() const
 
 ustring GitException::GetUnicodeMessageTxt() const
 {
-    const fl::i18n::VkLocale locale = fl::i18n::VkLocale::global();
+    const fl::i18n::VkLocale &locale = fl::i18n::VkLocale::global();
     ustring text = fl::i18n::MessageCatalog::get_message(GetBaseMsgIDObj(), locale);
     if (!addedText_.empty())
     {

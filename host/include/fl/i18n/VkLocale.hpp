@@ -19,8 +19,9 @@ class VCLINK_HOST_EXPORT VkLocale
 
     /// Returns the current locale of the process; vclink_host/locale.hpp sets it. By default it is
     /// that of "LC_ALL", "LC_MESSAGES" or "LANG", the first that is set and not empty. May be
-    /// called from any thread.
-    static VkLocale global();
+    /// called from any thread. The reference stays valid, and keeps this name, until the process
+    /// ends.
+    static const VkLocale &global();
 
     const std::string &name() const noexcept;
 

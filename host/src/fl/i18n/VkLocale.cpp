@@ -70,7 +70,7 @@ VkLocale::VkLocale(std::string name) : name_(std::move(name))
 {
 }
 
-VkLocale VkLocale::global()
+const VkLocale &VkLocale::global()
 {
     return globalLocale().get();
 }
