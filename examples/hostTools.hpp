@@ -29,8 +29,8 @@
 #include "vclink/git/LibGit2Exception.hpp"
 #include "vclink/util/exception/CancelledOperationException.hpp"
 
-/// What a host writes around the library: copy this header into a host, and change it there. It is
-/// no part of the library's interface, and makes no promise from one release to the next.
+/// Code that most hosts need around the library: copy this header into your host, and change it
+/// there. It is not a part of the library's interface, so each release can change it.
 namespace host_tools
 {
 
@@ -46,7 +46,7 @@ inline upath toUpath(const std::filesystem::path &path)
     return upath(fl::i18n::utf8_to_ustring(path.string()));
 }
 
-/// The part of a path that an adapter gave out behind the adapter's root.
+/// The part of an adapter's path after the adapter's root.
 inline ustring relativeName(const upath &path, const upath &root)
 {
     std::size_t start = root.string().size();
@@ -55,7 +55,7 @@ inline ustring relativeName(const upath &path, const upath &root)
     return path.string().substr(start);
 }
 
-/// The order of FileStateMap, for std::sort and the like: std::less is there, and operator< is not.
+/// The order of FileStateMap, for std::sort and others: upath has std::less, but no operator<.
 struct PathOrder
 {
     bool operator()(const upath &left, const upath &right) const noexcept
@@ -73,9 +73,9 @@ struct PathHash
     }
 };
 
-/// Whether an operation on this path acts on this very file and on no other. In a list of files the
-/// characters '*', '?' and '[' make a pattern, a backslash is taken for a slash, and a symbolic
-/// link means its target.
+/// Whether an operation on this path acts on this file and on no other one. In a list of files the
+/// characters '*', '?' and '[' act as patterns, a backslash acts as a slash, and a symbolic link
+/// means its target.
 inline bool meansOnlyItself(const upath &path)
 {
     std::error_code ignored;
@@ -110,8 +110,8 @@ inline const char *nameOf(vclink::FileState state) noexcept
     return "unknown";
 }
 
-/// Libgit2 can't read the working copy. Its state queries report no file then, and do not fail, so
-/// that everything looks clean.
+/// libgit2 can't read the working copy. A state query then returns no files and does not fail, so
+/// everything looks clean.
 class StatesUnknown : public std::runtime_error
 {
   public:
@@ -158,9 +158,9 @@ inline std::vector<upath> filesInConflict(vclink::CMAdapter &adapter)
 
 // ---- Progress.
 
-/// Passes reports on at most once in an interval, as a checkout makes two for each file. The first
-/// report, which has no message yet, and the end always pass. Called on the thread of the
-/// operation, and so is `show`.
+/// Forwards at most one report in an interval, because a checkout makes two for each file. Always
+/// forwards the first one, which has no message yet, and the end. Runs on the thread of the
+/// operation, and calls `show` there.
 class ThrottledProgress : public vclink::ProgressReporter
 {
   public:
@@ -208,9 +208,9 @@ class ThrottledProgress : public vclink::ProgressReporter
     std::atomic<bool> begun_{false};
 };
 
-/// Where an operation reports its progress, and where it is cancelled from. Make a new one, and a
-/// new adapter with it, for each operation that can be cancelled: a request that comes too late is
-/// remembered, and would stop the next operation of the same adapter.
+/// Receives the progress of an operation, and has the terminator that cancels it. Make a new one,
+/// and a new adapter with it, for each operation that can be cancelled: an adapter remembers a
+/// request that comes too late, and stops its next operation.
 class Interactor : public vclink::ApplicationInteractor
 {
   public:
@@ -261,15 +261,16 @@ struct Failure
     FailureKind kind = FailureKind::Other;
     /// e.g. "shared_vclink:git:AlreadyAdded"; empty for exceptions without a message identifier
     std::string id;
-    /// For the user, in the locale that was current when the failure was described; of the kinds
-    /// Cancelled and Other what(), in English. Those of AlreadyAdded and Conflicted list the files.
+    /// For the user, in the locale that was current when the failure was described. For the kinds
+    /// Cancelled and Other it is what(), in English. For AlreadyAdded and Conflicted it lists the
+    /// files.
     ustring text;
-    /// One path a line, where the kind has files.
+    /// One path in each line, if the kind has files.
     ustring files;
     /// libgit2's return code, or 0.
     int code = 0;
 
-    /// Whether another operation or program holds a lock, so that trying again is worth while.
+    /// Whether another operation or program holds a lock: try again.
     bool isLocked() const noexcept
     {
         constexpr int locked = -14; // GIT_ELOCKED
@@ -296,7 +297,7 @@ inline FailureKind kindOf(const std::string &id)
     return FailureKind::Other;
 }
 
-/// What an exception of the library says. Any thread, but one at a time for one exception.
+/// Describes an exception of the library. Any thread, but one thread at a time for each exception.
 inline Failure describe(const std::exception_ptr &exception)
 {
     Failure failure;

@@ -204,7 +204,7 @@ void FileCommands::commit()
     const auto found = std::make_shared<Found>();
     Operation operation;
     operation.title = say("Commit…");
-    // As the files are now, which the list may be yet to show.
+    // The current states, which the list may not show yet.
     operation.run = [found](Work &work)
     {
         found->snapshot = readSnapshot(work);

@@ -15,7 +15,7 @@
 namespace vclink::desktop
 {
 
-/// Tells when files of a working copy change, not more often than twice a second. Watches the
+/// Reports changes of files in a working copy, at most twice a second. Watches the
 /// folders that have files, with inotify itself: QFileSystemWatcher does not see that a file is
 /// written, and loses names that are not UTF-8.
 class FolderWatch
@@ -31,7 +31,7 @@ class FolderWatch
 
   private:
     void add(const std::filesystem::path &folder);
-    /// A new folder may have files already that nobody told of.
+    /// A new folder can have files that inotify has not reported.
     void addWithFolders(const std::filesystem::path &folder);
     void read();
 

@@ -11,9 +11,9 @@
 namespace vclink::desktop
 {
 
-/// Gives the library's records to a function while it lives. What the function throws is ignored:
-/// an exception of a sink would come out of the operation that writes the record, and end the
-/// process where a guard is destroyed.
+/// Passes the library's records to a function while it lives. Ignores what the function throws: an
+/// exception of a sink would leave the operation that writes the record, or end the process if a
+/// destructor writes it.
 class LogSink
 {
   public:

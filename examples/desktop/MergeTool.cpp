@@ -41,7 +41,7 @@ bool write(const fs::path &path, const std::string &bytes)
 
 void MergeTool::Later::operator()(QProcess *process) const
 {
-    // It may be the one whose signal is being served.
+    // This can run in a slot that one of its signals calls.
     process->disconnect();
     process->deleteLater();
 }

@@ -17,7 +17,7 @@ namespace vclink::desktop
 {
 
 /// Runs the host's merge tool, bin/lnxhost/vkMerge below its place of installation, on copies of a
-/// file's versions, and takes the result over if the file is still as it was.
+/// file's versions, and writes the result into the file if nobody has changed it since.
 class MergeTool
 {
   public:

@@ -35,7 +35,7 @@ struct Operation
     std::function<void(Work &)> run;
     /// After success. Both are called on the thread of the window.
     std::function<void()> done;
-    /// After failure; returns whether the listener need not be told.
+    /// After failure. Returns true if that is enough, and the listener need not report it.
     std::function<bool(const host_tools::Failure &)> failed;
 };
 

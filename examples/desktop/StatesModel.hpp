@@ -11,7 +11,7 @@
 namespace vclink::desktop
 {
 
-/// The files of a working copy with their states: a row a file.
+/// The files of a working copy with their states, one in each row.
 class StatesModel : public QAbstractTableModel
 {
   public:

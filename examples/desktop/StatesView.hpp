@@ -16,7 +16,7 @@ namespace vclink::desktop
 
 struct Snapshot;
 
-/// The list of files, what narrows it down, and what is selected in it.
+/// The list of files, with its filters and its selection.
 class StatesView : public QWidget
 {
   public:

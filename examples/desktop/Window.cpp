@@ -288,8 +288,8 @@ void Window::closeEvent(QCloseEvent *event)
         return;
     const bool talks =
         operation->kind == Operation::Kind::Download || operation->kind == Operation::Kind::Upload;
-    // A server that is silent can't be cancelled. What is cut off has written no file of a working
-    // copy that was there.
+    // A silent server can't be cancelled. A transfer that is cut off has written no file of an
+    // existing working copy.
     if (isClosing_ && talks)
         askFor(this, say("The server does not answer. End the program now?"),
                [] { std::_Exit(EXIT_FAILURE); });

@@ -19,9 +19,9 @@ namespace vclink::desktop
 /// What one operation works with, on the worker's thread: an adapter of its own for the working
 /// copy.
 ///
-/// Each guard that ends takes the merge drivers away for the whole process, and adapters, probes
-/// and generators hold one. So all of them begin and end while `guards` is shared, and a merge has
-/// it for itself, with a guard that begins right before it.
+/// Each guard that ends removes the merge driver for the whole process, and adapters, probes and
+/// generators hold one. So all of them begin and end while `guards` is locked shared. A merge locks
+/// it exclusively, with a guard that begins right before the merge.
 class Work
 {
   public:

@@ -8,8 +8,8 @@
 
 #include "fl/filesystem/path.hpp"
 
-/// What the library does not give out, asked of the git program: who commits, and the three sides
-/// of a conflict. The functions wait for git, and belong on the worker's thread.
+/// Asks the git program for what the library does not report: the author of commits, and the three
+/// versions of a file in conflict. The functions wait for git: call them on the worker's thread.
 namespace vclink::desktop
 {
 

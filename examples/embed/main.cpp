@@ -30,7 +30,7 @@ class Progress : public vclink::ProgressReporter
     }
 };
 
-/// What the library needs of its host: where to report progress, and where to be cancelled from.
+/// What the library needs from its host: a display for progress, and a way to cancel.
 class Interactor : public vclink::ApplicationInteractor
 {
   public:

@@ -13,8 +13,8 @@
 namespace vclink::shell
 {
 
-/// While it lives, a line on the terminal says what is being done, and for how long: a sign of life
-/// where nothing is known of how much there is to do. Nothing where no line is shown.
+/// While it lives, a line on the terminal shows what is being done, and for how long: a sign of
+/// life if the amount of work is unknown. Does nothing if no line is shown.
 class BusyLine
 {
   public:
@@ -27,7 +27,7 @@ class BusyLine
     BusyLine &operator=(const BusyLine &) = delete;
     ~BusyLine();
 
-    /// Adds what the other side says of its progress. Any thread.
+    /// Adds what the other side reports about its progress. Any thread.
     void setDetail(const std::string &detail);
 
   private:

@@ -13,8 +13,8 @@ namespace vclink::shell
 
 class Session;
 
-/// A command of the shell. An object serves one command line: it is told its arguments while the
-/// line is read, and run at most once.
+/// A command of the shell. An object serves one command line: it receives its arguments while the
+/// line is read, and runs at most once.
 class Command
 {
   public:

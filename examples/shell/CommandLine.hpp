@@ -44,8 +44,8 @@ class CommandLine
     ~CommandLine();
 
     /// Reads the arguments. To be called once.
-    /// @return nothing when there is a command to run; otherwise the status to end with, the person
-    ///         having been told why, or helped
+    /// @return nothing if there is a command to run; otherwise the status to end with, after the
+    ///         reason or the help was written
     /// @throws ShellFailure when the help can't be written
     std::optional<ExitStatus> parse(int argc, const char *const *argv, Output &output);
 
@@ -61,7 +61,7 @@ class CommandLine
     const CLI::App *parsedCommand() const;
     std::string describe(const CLI::ParseError &error) const;
     std::string describeExtra() const;
-    /// What to say of an option on the wrong side of the command; empty if it is unknown there too.
+    /// The text about an option on the wrong side of the command; empty if it is unknown there too.
     std::string describePlace(const CLI::App *command, const std::string &option) const;
     std::string describeMissing(const std::string &name) const;
     ExitStatus refuse(const std::string &reason) const;

@@ -16,9 +16,10 @@ namespace vclink::shell
 {
 
 /// While it lives, SIGINT (Ctrl-C), SIGTERM and SIGHUP ask the back end to stop instead of ending
-/// the process: the first one asks on the terminator. Later ones change nothing as long as the back
-/// end reports something. If it has not for three seconds, or could not be asked, one restores the
-/// defaults, so that the next one ends the process. A signal that was ignored before stays ignored.
+/// the process: the first one asks on the terminator. Later ones have no effect while the back end
+/// reports something. If it has reported nothing for three seconds, or could not be asked, a signal
+/// restores the defaults, so that the one after it ends the process. A signal that was ignored
+/// before stays ignored.
 ///
 /// The signals' handler only writes to a pipe; a thread of its own reads it and asks. No signal is
 /// blocked on the thread that works, so that programs started there inherit no blocked signal.
@@ -51,7 +52,7 @@ class InterruptWatch
   private:
     static constexpr std::array<int, 3> signals{SIGINT, SIGTERM, SIGHUP};
 
-    /// Lets the signals that were not ignored do this.
+    /// Sets the action of the signals that were not ignored.
     void take(const struct sigaction &action) noexcept;
     void restore() noexcept;
     void listen();

@@ -11,7 +11,7 @@ namespace vclink::shell
 namespace
 {
 
-/// Of "merge.NAME.driver COMMAND" the name; empty for other records.
+/// The NAME of "merge.NAME.driver COMMAND"; empty for other records.
 std::string_view driverOf(std::string_view record)
 {
     constexpr std::string_view begin = "merge.";
@@ -22,7 +22,7 @@ std::string_view driverOf(std::string_view record)
     return isOne ? record.substr(begin.size(), place - begin.size()) : std::string_view();
 }
 
-/// Of "Throwing error TEXT (CODE)" the code; 0 for other records.
+/// The CODE of "Throwing error TEXT (CODE)"; 0 for other records.
 int codeOf(std::string_view record)
 {
     constexpr std::string_view begin = "Throwing error ";

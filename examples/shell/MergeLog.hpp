@@ -24,11 +24,11 @@ struct MergeNotes
     std::map<std::string, std::size_t> refusals;
 };
 
-/// Takes the note that a record of the library's log is of, if it is of any.
+/// Takes what a record of the library's log contains of these notes.
 void takeNote(MergeNotes &notes, const std::string &record);
 
-/// While it lives, reads notes from the library's log: the back end does not report to its caller
-/// which commands have refused a file, and libgit2's code of a failed merge. At most one object at
+/// While it lives, reads notes from the library's log: only there are the commands that have
+/// refused a file, and libgit2's code of a failed merge. At most one object at
 /// a time.
 class MergeLog
 {

@@ -36,13 +36,13 @@ bool personWantsColour()
     return !refused && terminalHasControls();
 }
 
-/// Does nothing. A signal that is ignored would be ignored by merge commands as well, while a
-/// handler is not handed on to them.
+/// Does nothing. If the signal were ignored, merge commands would ignore it too; they do not
+/// inherit a handler.
 extern "C" void goOn(int /*signal*/)
 {
 }
 
-/// Whoever has the signal ignored wants to be told.
+/// A caller who ignores the signal wants the error.
 bool isBrokenPipeAnError()
 {
     struct sigaction action = {};
@@ -147,8 +147,8 @@ void holdStandardDescriptors()
     {
         if (::fcntl(standard, F_GETFD) < 0)
         {
-            // The lowest free number is the one just found to be free. Opened the wrong way round,
-            // so that reading or writing still fails.
+            // open(2) returns the lowest free number, which is this one. Opened for the wrong
+            // direction, so that reading or writing still fails.
             const int mode = standard == STDIN_FILENO ? O_WRONLY : O_RDONLY;
             static_cast<void>(::open("/dev/null", mode));
         }

@@ -25,7 +25,7 @@ class Output
     /// flush then
     void flush();
 
-    /// Whether a person sees the output and a colour says something to them.
+    /// Whether the output is a terminal on which colours are wanted.
     bool hasColour() const noexcept;
 
   private:
@@ -34,14 +34,13 @@ class Output
     bool hasColour_;
 };
 
-/// Whether a person sees what is written to standard error.
+/// Whether standard error is a terminal.
 bool errorsAreOnTerminal() noexcept;
 
-/// Whether the person at that terminal can be shown a line that is drawn again and again.
+/// Whether it is a terminal on which a line can be drawn again and again.
 bool errorsCanBeRedrawn() noexcept;
 
-/// Tells what was done, in a line on standard error, to a person who sees it: nothing is written
-/// where that is no terminal.
+/// Writes a line about what was done to standard error, only if that is a terminal.
 void remark(const std::string &text);
 
 /// Lets the program continue if nobody reads its output or its messages any more, as in a pipe to

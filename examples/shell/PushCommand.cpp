@@ -99,7 +99,7 @@ class PushCommand : public Command
         return splitAtNul(text);
     }
 
-    /// What the remote had when it was heard of last may be there still: only then it is asked.
+    /// Removes what the remote has already. Asks it only if it had the same when it was last seen.
     static void dropWhatIsThere(const git::BranchManager &manager, const git::GitRemote &remote,
                                 const std::string &name, std::vector<PushRefspec> &refspecs)
     {

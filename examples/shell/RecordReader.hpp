@@ -8,8 +8,8 @@
 namespace vclink::shell
 {
 
-/// While it lives, reads what the library writes to its log, for what an operation does not tell
-/// its caller otherwise. At most one object at a time.
+/// While it lives, reads the records of the library's log, for results that an operation reports
+/// nowhere else. At most one object at a time.
 class RecordReader
 {
   public:

@@ -36,7 +36,7 @@ struct RemoteNotes
     std::string unfinished;
 };
 
-/// Takes the note that a record of the library's log is of, if it is of any.
+/// Takes what a record of the library's log contains of these notes.
 void takeNote(RemoteNotes &notes, const std::string &record);
 
 /// While it lives, reads notes from the library's log: an operation with a remote only logs which

@@ -36,9 +36,9 @@ class Session
     const CMAdapterFactory &factory() const noexcept;
     const std::shared_ptr<ShellInteractor> &interactor() const noexcept;
 
-    /// The adapter of the working copy that the current folder lies in; made at the first call.
-    /// @throws ShellFailure if the current folder is in none, or in a bare repository inside a
-    ///         working copy, and what the back end throws
+    /// The adapter of the working copy that contains the current folder; made at the first call.
+    /// @throws ShellFailure if there is none, or if it is a bare repository inside a working copy;
+    ///         and what the back end throws
     CMAdapter &adapter();
 
     /// As adapter().

@@ -8,11 +8,11 @@
 namespace vclink::shell
 {
 
-/// What is to be done about a refused access, in a sentence or a few: libgit2's own text often says
-/// something else, and never what to do.
+/// What to do if access was refused, in a sentence or a few. libgit2's own text often names another
+/// cause, and never says what to do.
 /// @param failure of the operation
 /// @param credentials the kinds that the server asked for last, see RemoteNotes
-/// @return an empty text where the failure has another cause
+/// @return an empty text if the failure has another cause
 std::string explainRefusedAccess(const git::GitError &failure, unsigned credentials);
 
 } // namespace vclink::shell

@@ -22,7 +22,7 @@ std::string readLine(const fs::path &path)
     return line;
 }
 
-/// Of "ref: refs/heads/NAME", and of "refs/heads/NAME" as a rebase keeps it, the name.
+/// The NAME of "ref: refs/heads/NAME", or of "refs/heads/NAME" as a rebase keeps it.
 std::string shortName(const std::string &line)
 {
     const std::string folder = "refs/heads/";
@@ -31,7 +31,7 @@ std::string shortName(const std::string &line)
                                                               : std::string();
 }
 
-/// The root of the working copy whose state is in this folder; empty if that is gone, or none is.
+/// The root of the working copy whose state is in this folder; empty if it is gone or unknown.
 fs::path rootOf(const fs::path &state)
 {
     const std::string entry = readLine(state / "gitdir");

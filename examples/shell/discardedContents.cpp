@@ -138,12 +138,13 @@ class Index
     {
         return changes_;
     }
-    /// Of HEAD, where HEAD and the index differ. Its folder stays as it is.
+    /// Whether this is a submodule, in HEAD if HEAD and the index differ. Its folder stays as it
+    /// is.
     bool isSubmodule(const std::string &name) const
     {
         return submodules_.count(name) != 0;
     }
-    /// Changed files that have no changed state, whatever they hold.
+    /// Changed files without a changed state, because Git was told not to look at them.
     std::vector<StagedChange> overlookedChanges() const
     {
         std::vector<StagedChange> files;
@@ -314,7 +315,7 @@ try
 }
 catch (const StoreFailure &)
 {
-    // Then nothing can be kept either, which is told.
+    // Then nothing can be kept either, which keepContents() reports.
 }
 
 WayBack keepContents(Session &session, const std::vector<NamedPath> &paths,

@@ -36,8 +36,8 @@ void inform(const std::string &text);
 /// Writes what a server says to standard error, each line marked as the server's.
 void relay(const std::string &text);
 
-/// Tells the person of the exception in flight, in the words that it has for them: its localized
-/// text where it has one. Of OutputClosed it says nothing. To be called in a handler only.
+/// Writes the text of the current exception to standard error, localized if it has such a text.
+/// Writes nothing for OutputClosed. Call it only in a handler.
 /// @return the status to end with
 ExitStatus reportFailure();
 

@@ -19,7 +19,7 @@ upath inRoot(const upath &root, const ustring &name)
     return upath(root.string() + u'/' + name);
 }
 
-/// Names of files, as far as the back end can be told of them.
+/// The names of the files that the back end can get.
 std::vector<upath> nameFiles(const FileStateMap &files, const upath &root, LinkNames links)
 {
     std::vector<upath> names = addressable(filterFollowed(files, root, false), root);
@@ -36,8 +36,7 @@ std::vector<upath> nameFiles(const FileStateMap &files, const upath &root, LinkN
     return names;
 }
 
-/// The root has no name. What lies in it has, also what was renamed and bears its old name in the
-/// states.
+/// The root has no name, its content has. A renamed file has its old name in the states.
 std::vector<upath> coverRoot(const upath &root, const FileStateMap &meant, LinkNames links)
 {
     std::map<ustring, FileStateMap> groups;

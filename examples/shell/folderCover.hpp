@@ -9,27 +9,27 @@
 namespace vclink::shell
 {
 
-/// What a list holds for files whose paths the back end would follow to others.
+/// What a list contains for a file whose path the back end would follow to another one.
 enum class LinkNames
 {
-    /// nothing: the call looks files up by their states, and takes the paths that it finds
+    /// nothing: the operation looks files up by their states, and uses the paths that it finds
     None,
-    /// patterns, where there are any, see patternForEntry()
+    /// a pattern if there is one, see patternForEntry()
     Patterns
 };
 
 struct Cover
 {
-    /// what is to be acted on
+    /// the files to act on
     FileStateMap files;
-    /// what the back end is told
+    /// the list for the back end
     std::vector<upath> list;
 };
 
-/// A short list that means, to the back end, all files that are to be acted on, of those named and
-/// below the folders named, and no others that matter: it looks each of the working copy's files up
-/// in the whole list, which takes long where thousands of files are named. A folder stays in the
-/// list if the back end treats it as everything below it.
+/// Makes a list for the back end that means all files to act on, among the named files and those
+/// below the named folders, and no other file that matters. The list is short, because the back end
+/// compares each file of the working copy with the whole list. A folder stays in the list if the
+/// back end treats it as everything below it.
 /// @param isMeant whether a file of this state is to be acted on
 /// @throws what the system throws if the folder cannot be read
 Cover cover(const upath &root, const std::vector<NamedPath> &paths,

@@ -58,7 +58,7 @@ int spawn(pid_t &child, std::vector<std::string> words, const std::array<int, 3>
     }
     posix_spawnattr_t attributes;
     ::posix_spawnattr_init(&attributes);
-    // A program that is cut off leaves half of what it writes.
+    // A program that is stopped leaves half of what it writes.
     ::posix_spawnattr_setflags(&attributes, POSIX_SPAWN_SETPGROUP);
     std::vector<std::string> variables = environmentOfPrograms();
     const int error = ::posix_spawnp(&child, words.front().c_str(), &actions, &attributes,

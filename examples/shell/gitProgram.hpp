@@ -10,7 +10,7 @@
 
 #include "MemoryFile.hpp"
 
-/// What the library does not give out is asked of the git program, as far as it is installed.
+/// Asks the git program, if it is installed, for what the library does not report.
 namespace vclink::shell
 {
 
@@ -31,7 +31,7 @@ std::optional<std::string> runGit(const std::filesystem::path &folder,
                                   const std::vector<std::string> &arguments,
                                   std::string_view input = {});
 
-/// The pieces of an output of git, each of which has a NUL at its end.
+/// The parts of an output of git, each of which ends with a NUL.
 std::vector<std::string> splitAtNul(const std::string &text);
 
 /// Git's settings of branches and remotes, by their full names as git lists them; the last value of

@@ -7,7 +7,7 @@
 
 #include <CLI/CLI.hpp>
 
-/// What CLI11 would misread is hidden from it, and shown again when it has found its option.
+/// Hides arguments that CLI11 would misread, until they have found their option.
 namespace vclink::shell
 {
 
@@ -21,7 +21,7 @@ std::string showHidden(std::string text);
 void showHiddenValues(CLI::App &line);
 
 /// The locale that the option --lang names, if it is there. It is needed before the line is read,
-/// as what is wrong with the line is said in that language.
+/// because messages about the line are in that language.
 std::optional<std::string> findLocale(int argc, const char *const *argv);
 
 } // namespace vclink::shell

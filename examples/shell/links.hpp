@@ -7,27 +7,27 @@
 #include "fl/filesystem/path.hpp"
 #include "vclink/FileStateMap.hpp"
 
-/// Symbolic links in the working copy. To Git each is an entry of its own; the back end follows the
-/// names it is given, and would act on what they lead to.
+/// Symbolic links in the working copy. For Git each is an entry of its own. The back end follows
+/// them, and would act on their targets.
 namespace vclink::shell
 {
 
-/// The path under which Git knows what was named: links above the root and up to it are resolved,
-/// those in the working copy are not.
+/// The path under which Git knows a file: links in the path of the root are resolved, those in the
+/// working copy are not.
 /// @param path absolute
 /// @throws std::filesystem::filesystem_error
 upath entryForm(const std::filesystem::path &path, const upath &root);
 
-/// Whether the back end, told of this path below the root, would follow a link, at the path itself
-/// or at a folder above it. A link that leads nowhere is not followed.
+/// Whether the back end would follow a link if it gets this path below the root: the path itself or
+/// a folder above it is a link. It does not follow a link without a target.
 bool isFollowed(const upath &entry, const upath &root);
 
-/// Those of the files that are told of by a path that would be followed, or the others.
+/// The files with a path that would be followed, or the others.
 FileStateMap filterFollowed(const FileStateMap &states, const upath &root, bool areFollowed);
 
-/// A pattern, as a path, that means to the back end just the entry at a path that would be
-/// followed: what does not exist by its very name can't be. None where the name is odd itself. Only
-/// for calls that do not look up the states first, to name the files that they find.
+/// A pattern, as a path, that matches only the entry at a path that would be followed. The back end
+/// cannot follow a pattern, because no file has its text as a name. Returns nothing if the name has
+/// special characters. Only for operations that do not look up the states first.
 std::optional<upath> patternForEntry(const upath &entry, const upath &root);
 
 } // namespace vclink::shell

@@ -17,14 +17,14 @@ namespace vclink::shell
 FileStateMap findRefused(CMAdapter &adapter, const FileStateMap &conflicts,
                          const MergeNotes &notes);
 
-/// Those of the files that a merge driver is for.
+/// The files whose attribute names this merge driver.
 FileStateMap withDriver(CMAdapter &adapter, const FileStateMap &files, const std::string &driver);
 
-/// The files that HEAD and the other side have changed, each in its way; none without git.
+/// The files that both HEAD and the other side have changed, differently; none without git.
 FileStateMap findChangedByBoth(CMAdapter &adapter, const std::optional<std::string> &theirs);
 
-/// The files that have another name than in the commits, because something else has theirs;
-/// ignored ones, too.
+/// The files that the merge wrote under another name, because something else has theirs; also
+/// ignored ones.
 /// @param states of the whole working copy
 FileStateMap findSetAside(const upath &root, const FileStateMap &states);
 

@@ -25,8 +25,8 @@ class TopOfTheirs
     {
     }
 
-    /// Whether something of theirs is where this file is. Only at the top: libgit2's own refusals
-    /// are of files there, and those of the library name a file.
+    /// Whether their side has something in the place of this file. Looks only at the top, because
+    /// libgit2's own refusals concern files there, and the library's refusals name a file.
     bool collidesWith(const std::string &name)
     {
         const std::size_t end = name.find('/');

@@ -33,8 +33,8 @@ FileStateMap pick(const FileStateMap &states, const upath &path)
     return picked;
 }
 
-/// Completes what was named by the states of its own entry, which a folder has too if it is in the
-/// place of a file, and by those below a folder that is gone.
+/// Adds the state of the entry itself, which a folder also has if it is in the place of a file, and
+/// the states below a folder that is gone.
 void lookUpEntry(CMAdapter &adapter, const FileStateMap &states, NamedPath &named)
 {
     const upath &path = named.path;
@@ -66,7 +66,7 @@ NamedPath lookUpFolder(CMAdapter &adapter, const std::string &argument, const fs
     return named;
 }
 
-/// As Git knows what is there, and what lay below it before it became a link.
+/// The link as Git knows it, and the files that were below this name before it became a link.
 NamedPath lookUpLink(CMAdapter &adapter, const std::string &argument, const upath &entry)
 {
     FileStateMap states = pick(folderStates(adapter, adapter.getRootFolder()), entry);

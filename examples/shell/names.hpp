@@ -34,24 +34,24 @@ bool liesIn(const ustring &path, const ustring &folder);
 /// @throws std::filesystem::filesystem_error
 upath canonicalForm(const upath &path);
 
-/// The way from a folder to a path, both absolute and free of symbolic links: "." for the folder
-/// itself.
+/// The relative path from a folder to a path, both absolute and free of symbolic links: "." for the
+/// folder itself.
 ustring wayTo(const upath &path, const ustring &folder);
 
 /// A path as a person in the current folder types it, see quoteName().
 std::string showPath(const upath &path);
 
-/// A file name that stays on its line and does nothing to the terminal: where it holds a control
+/// A file name that stays on its line and has no effect on the terminal: if it contains a control
 /// character, a double quote, a backslash or a byte that is not UTF-8, it is put in double quotes
-/// and these are escaped as in C, the way git shows such names. One with a character that changes
+/// and these are escaped as in C, as git shows such names. One with a character that changes
 /// the direction of writing is put in quotes too. Other names stay as they are.
 std::string quoteName(const ustring &name);
 
 /// A word as a person gives it to a shell, which reads the same bytes.
 std::string quoteForShell(const std::string &word);
 
-/// A text with what could do something to the terminal escaped as in quoteName(), line feeds and
-/// tabs left as they are.
+/// A text in which characters with an effect on the terminal are escaped as in quoteName(), except
+/// line feeds and tabs.
 std::string makePrintable(const ustring &text);
 
 /// The name of a branch, remote or revision, for a message that has it in quotes.

@@ -16,7 +16,7 @@ class OverlookedMarks
     /// Reads the marks. Without git there are none.
     explicit OverlookedMarks(std::filesystem::path root);
 
-    /// Sets those again that are gone since, and names the files if that fails.
+    /// Sets marks again that are gone now, and names the files if that fails.
     void restore() const;
 
   private:

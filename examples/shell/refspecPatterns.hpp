@@ -10,8 +10,8 @@
 namespace vclink::shell
 {
 
-/// What one side of a refspec becomes if the other side is a name: the part of the name that the
-/// "*" of a pattern matches takes the place of the other "*". Nothing if the name does not match.
+/// Completes one side of a refspec if the other side is a name: replaces its "*" by the part of the
+/// name that the other "*" matches. Returns nothing if the name does not match.
 /// @param from, to the sides; both have a "*" or none has
 std::optional<std::string> mapReference(const std::string &from, const std::string &to,
                                         const std::string &name);

@@ -7,8 +7,8 @@
 #include "vclink/FileStateMap.hpp"
 
 /// The back end reports a file that was renamed in the index under its old name only, and a new
-/// file of that name as untracked. Here the old name is deleted and the new one added. Without git
-/// that is asked of the back end, which leaves out new names if very many files have no state.
+/// file of that name as untracked. Here the old name is deleted and the new one added. If git is
+/// not installed, the back end is asked for the new names, except if very many files have no state.
 namespace vclink::shell
 {
 

@@ -19,8 +19,8 @@ class StoreFailure : public std::runtime_error
     using std::runtime_error::runtime_error;
 };
 
-/// A tar archive of files as they are on the disk, byte for byte: what git stores of a file has
-/// gone through the filters that the attributes name, and comes back through others.
+/// A tar archive of files as they are on the disk, byte for byte: git would store and restore their
+/// content through the filters that the attributes name.
 /// @param names relative to the root; a folder's files are named by themselves
 /// @return the id of a blob
 /// @throws StoreFailure
@@ -36,7 +36,7 @@ enum class Filters
     Ignored
 };
 
-/// Those of these files that are something else on the disk than their blobs.
+/// The files whose content on the disk differs from their blobs.
 std::vector<StagedChange> selectOthersThanOnDisk(const std::filesystem::path &root,
                                                  const std::vector<StagedChange> &files,
                                                  Filters filters);

@@ -9,15 +9,15 @@
 namespace vclink::shell
 {
 
-/// " Did you mean '...'?" for the known word that is most like a word that is not known; empty if
-/// none is.
+/// " Did you mean '...'?" with the known word that is most similar to an unknown one; empty if none
+/// is similar.
 std::string suggest(const std::string &word, const std::vector<std::string> &known);
 
-/// As suggest(), for the name of a command: also what git calls it.
+/// As suggest(), for the name of a command; also knows git's names.
 std::string suggestCommand(const std::string &word);
 
-/// What there is in place of a branch that there is not: one of almost that name, or one of a
-/// remote; empty if nothing is.
+/// What to use instead of a branch that does not exist: one with a similar name, or one of a
+/// remote; empty if there is neither.
 std::string suggestBranch(const git::BranchManager &manager, const std::string &name);
 
 /// What to do in place of a command with an option that git has; empty if nothing is known.

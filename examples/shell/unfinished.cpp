@@ -62,7 +62,7 @@ bool isInSeries(const fs::path &root)
     return count > 1;
 }
 
-/// What has more to do than one commit; empty if nothing is under way.
+/// The operation with more than one commit that is under way; empty if there is none.
 std::string describeOperation(CMAdapter &adapter)
 {
     const std::string state = git::BranchManager::create(adapter)->getRepositoryState();

@@ -8,8 +8,8 @@
 namespace vclink::shell
 {
 
-/// @throws ShellFailure in the midst of what has more to do than one commit, e.g. a rebase: a
-/// commit of the back end ends it, and the rest is dropped without a word
+/// @throws ShellFailure during an operation with more than one commit, e.g. a rebase: a commit of
+/// the back end ends it, and drops the rest without a warning
 void refuseHalfWay(CMAdapter &adapter);
 
 /// Whether a merge is under way, with conflicts or without.

@@ -11,8 +11,8 @@ namespace vclink::shell
 
 class Session;
 
-/// Says what to do about the exception in flight, if that is known: which lock was left, or how a
-/// repository of another user is trusted. To be called in a handler only.
+/// Writes what to do about the current exception, if that is known: which lock was left, or how to
+/// trust a repository of another user. Call it only in a handler.
 void tellWayOut(Session &session);
 
 /// Names the locks in a repository, and how old they are.
@@ -25,7 +25,7 @@ bool namesLock(CMAdapter &adapter, const std::string &text);
 /// Where a repository says that it has a format which libgit2 does not support.
 std::string explainFormat(const std::filesystem::path &folder);
 
-/// How a repository of another user is opened; empty if this one belongs to who asks.
+/// How to open a repository of another user; empty if it belongs to the current user.
 std::string explainOwner(const std::string &folder);
 
 } // namespace vclink::shell

@@ -6,18 +6,18 @@
 #include "vclink/CMAdapter.hpp"
 #include "vclink/FileStateMap.hpp"
 
-/// What the back end does not say of a working copy.
+/// What the back end does not report about a working copy.
 namespace vclink::shell
 {
 
-/// Whether a folder has an entry ".git", which a bare repository has not.
+/// Whether a folder has an entry ".git"; a bare repository has none.
 bool hasGitEntry(const std::filesystem::path &folder);
 
 /// The folder in which Git keeps the state of a working copy.
 /// @param root of the working copy
 std::filesystem::path stateFolder(const std::filesystem::path &root);
 
-/// The folder of what all working copies of a repository share.
+/// The folder with everything that all working copies of a repository share.
 /// @param state of one of them, as from stateFolder(), or a bare repository
 std::filesystem::path sharedFolder(const std::filesystem::path &state);
 
@@ -27,7 +27,7 @@ FileStateMap wholeStates(CMAdapter &adapter);
 
 /// If libgit2 can't read a working copy, the back end reports no file at all, which looks like a
 /// working copy without changes.
-/// @throws ShellFailure in that case; to be called if a question about states brought none
+/// @throws ShellFailure in that case; call it if a query returned no states
 void refuseUnknownStates(CMAdapter &adapter);
 
 } // namespace vclink::shell
