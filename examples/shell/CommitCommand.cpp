@@ -84,7 +84,7 @@ class CommitCommand : public Command
         line.footer(say("Commits all changes to tracked files, staged or not, and all that was "
                         "added or removed. Concludes a\nmerge that is under way. The author comes "
                         "from git's settings user.name and user.email; if they are\nnot set, from "
-                        "USER or LOGNAME and the name of the host."));
+                        "USER or LOGNAME and the machine's name."));
     }
 
     ExitStatus run(Session &session) override

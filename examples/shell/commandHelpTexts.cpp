@@ -87,7 +87,7 @@ constexpr Translation commandHelpRows[] = {
      "ェリーピックの途中でも行い、それを終わらせる"},
     {"Commits all changes to tracked files, staged or not, and all that was added or removed. "
      "Concludes a\nmerge that is under way. The author comes from git's settings user.name and "
-     "user.email; if they are\nnot set, from USER or LOGNAME and the name of the host.",
+     "user.email; if they are\nnot set, from USER or LOGNAME and the machine's name.",
      "Committet alle Änderungen an Dateien, die Git kennt, vorgemerkt oder nicht, und was "
      "hinzugefügt oder\nentfernt wurde. Schließt einen laufenden Merge ab. Der Autor kommt aus den "
      "Git-Einstellungen\nuser.name und user.email, sonst aus USER oder LOGNAME und dem Namen des "

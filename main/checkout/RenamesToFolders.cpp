@@ -29,8 +29,8 @@ Diff compare(git_repository *repository, git_tree *before, git_tree *after)
     return diff;
 }
 
-/// Marks what a merge can take for a rename. It counts from a similarity of 50 % on; the rest is
-/// for differences between the two searches.
+/// Marks what a merge can take for a rename. A merge requires a similarity of 50 %. This search
+/// requires less, because its similarities can differ from those of the merge.
 void findRenames(git_diff *diff)
 {
     git_diff_find_options options{};

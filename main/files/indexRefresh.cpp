@@ -73,8 +73,8 @@ int findObstacle(const std::string &workdir, const std::string &path)
     if (lstat((workdir + path).c_str(), &status) == 0)
     {
         const int error = findHidingFolder(workdir, path);
-        // Something else, such as a folder, is in its place, unless it only cannot be seen. A file
-        // or link is not something else: the refresh would have staged it.
+        // If it can be seen, the refresh would have staged a file or link. Anything else, such as a
+        // folder, means that the tracked file is gone.
         const bool isMissed =
             (S_ISREG(status.st_mode) || S_ISLNK(status.st_mode)) && !isBehindLink(workdir, path);
         return error == 0 && isMissed ? EIO : error;

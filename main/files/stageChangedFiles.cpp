@@ -114,8 +114,8 @@ class Staging
     std::vector<std::string> removed_;
 };
 
-/// Whether the comparison has a file with other attributes, which decide about files that are
-/// staged before it in another way than about those behind it.
+/// Whether a file with attributes has changed. Its attributes apply differently to the files that
+/// are staged before it and to those after it.
 bool hasOtherAttributes(git_diff *diff)
 {
     const std::size_t count = git_diff_num_deltas(diff);
@@ -130,7 +130,7 @@ bool hasOtherAttributes(git_diff *diff)
     return false;
 }
 
-/// Files with attributes are in it whatever they are, because others depend on them.
+/// Includes files with attributes even if they are not plain, because others depend on them.
 std::vector<std::string> pathsOf(const std::vector<ChangedFile> &files)
 {
     std::vector<std::string> paths;
