@@ -2,6 +2,7 @@
 #include "main/BasicBranchManager.hpp"
 
 #include <array>
+#include <string_view>
 #include <utility>
 
 #include <git2/branch.h>
@@ -19,18 +20,20 @@
 #include "main/merge/BranchMerger.hpp"
 #include "main/mergeState/unfinishedOperation.hpp"
 #include "options/gitRecords.hpp"
+#include "util/lock/BranchSettings.hpp"
 #include "util/lock/IndexLock.hpp"
 #include "util/lock/PackedReferences.hpp"
 #include "util/lock/referenceLocks.hpp"
 #include "util/repository/objectIds.hpp"
 #include "util/repository/reflogAccess.hpp"
 #include "util/repository/repository.hpp"
-#include "util/scope/KeptMode.hpp"
 
 namespace vclink::git
 {
 namespace
 {
+
+constexpr std::string_view branchFolder = "refs/heads/";
 
 std::vector<BranchPointer> listBranches(git_branch_t type, git_repository *repository)
 {
@@ -71,6 +74,13 @@ bool isBranchAt(git_repository *repository, const char *name, const git_oid &id)
     const GitResult<OwnedHandle<git_reference>> branch =
         acquire<git_reference>(git_branch_lookup, repository, name, GIT_BRANCH_LOCAL);
     return branch.has_value() && isSameId(targetOf(branch.value().get()), id);
+}
+
+/// Deletes the reference and its reflog. Leaves the settings to BranchSettings.
+GitResult<void> deleteReference(git_repository *repository, git_reference *branch)
+{
+    const WithoutConfiguration noSettings(repository);
+    return call(git_branch_delete, branch);
 }
 
 /// Reads the result of a function that returns 1 or 0.
@@ -209,6 +219,8 @@ void BasicBranchManager::deleteBranch(const BranchName &name)
 {
     const char *const shortName = asGitString(name);
     OwnedHandle<git_repository> repository = adapter_.getRepository();
+    // Still asked how long to wait.
+    OwnedHandle<git_repository> earlier;
     bool isFirstTry = true;
     git_oid id{};
     const auto deleteOnce = [&]
@@ -217,17 +229,21 @@ void BasicBranchManager::deleteBranch(const BranchName &name)
         {
             // After a look at locked packed references, a handle treats the branch as deleted and
             // reports success.
-            repository = adapter_.getRepository();
+            earlier = std::exchange(repository, adapter_.getRepository());
         }
         const OwnedHandle<git_reference> branch = lookupLocalBranch(repository.get(), shortName);
         id = targetOf(branch.get());
         const char *const reference = git_reference_name(branch.get());
         refuseDeletionInUnfinishedOperation(repository.get(), reference);
-        // libgit2 removes the branch's configuration first, and does not restore it.
         awaitUnlocked(repository.get(), reference);
         refuseUnremovableReflog(repository.get(), reference);
-        const KeptMode mode(git_repository_commondir(repository.get()) + std::string("config"));
-        return call(git_branch_delete, branch.get());
+        BranchSettings settings(repository.get(), reference + branchFolder.size());
+        GitResult<void> deleted = deleteReference(repository.get(), branch.get());
+        if (deleted.has_value())
+        {
+            settings.remove();
+        }
+        return deleted;
     };
     PackedReferences packed(repository.get());
     const auto lock = [&packed] { return packed.lock(); };

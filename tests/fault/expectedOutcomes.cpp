@@ -209,6 +209,8 @@ std::vector<Tolerance> tolerancesOfOthers(const std::string &operation, const st
         // The library ends the comparison itself as soon as it has seen something of that.
         {"commitMergeWithoutMark", "git_diff_tree_to_tree", any, any, normal, true},
         {"commitMergeWithoutMark", "git_merge_bases", any, GIT_ENOTFOUND, normal},
+        // Whether the handle has its configuration again.
+        {"deleteBranch", "git_repository_set_config", 2, any, normal},
         // No value is what the reads of the configuration make of every failure.
         {"globalFilePath", "git_config_find_global", any, any, "done: nothing"},
         {"read", "git_config_get_string_buf", any, any, "done: nothing"},

@@ -120,6 +120,14 @@ void makeBranches(GitRepository &repository)
     repository.git({"update-ref", "refs/remotes/origin/main", "HEAD"});
 }
 
+void makeSettings(GitRepository &repository)
+{
+    makeBranches(repository);
+    repository.git({"config", "branch.topic.remote", "origin"});
+    repository.git({"config", "branch.topic.base", "one"});
+    repository.git({"config", "--add", "branch.topic.base", "two"});
+}
+
 void makeLinkedFolder(GitRepository &repository)
 {
     makeBranches(repository);

@@ -30,6 +30,8 @@ void makeUnreadable(GitRepository &repository);
 void makeTypeChange(GitRepository &repository);
 /// Plain with the branch "topic", which changes "file"; the working tree is clean.
 void makeBranches(GitRepository &repository);
+/// Branches, with settings of "topic", one of them twice.
+void makeSettings(GitRepository &repository);
 /// Branches, with an untracked link in the place of "sub", which both branches have.
 void makeLinkedFolder(GitRepository &repository);
 /// Plain with "folder/deep/inside", and the branch "topic", where "folder" is a file.

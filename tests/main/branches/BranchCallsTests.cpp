@@ -45,7 +45,10 @@ TEST_F(CallsOnBranches, AreTheseInOrder)
           "git_reference_free", "git_commit_free", "git_repository_free"}},
         {[this] { branches().deleteBranch("new"); },
          joined({{"git_branch_lookup", "git_transaction_new", "git_transaction_lock_ref",
-                  "git_transaction_free", "git_branch_delete"},
+                  "git_transaction_free", "git_config_open_ondisk", "git_config_foreach",
+                  "git_repository_config", "git_config_new", "git_repository_set_config",
+                  "git_config_free", "git_branch_delete", "git_repository_set_config",
+                  "git_config_free", "git_config_free"},
                  end})},
         {[this] { branches().getCurrentBranch(); },
          joined({{"git_repository_head", "git_branch_name"}, end})}};
@@ -76,6 +79,16 @@ TEST_F(CallsOnBranches, DeleteABranchAgainThatIsPackedMeanwhile)
     branches().deleteBranch("packed");
     EXPECT_EQ(deletions, 2);
     EXPECT_FALSE(repository_.tryGit({"rev-parse", "--verify", "packed"}).succeeded());
+}
+
+TEST_F(CallsOnBranches, DeleteNoSettingsIfTheyFailToDeleteTheBranch)
+{
+    repository_.git({"branch", "topic"});
+    repository_.git({"config", "branch.topic.remote", "o"});
+    LibGit2Recorder calls;
+    calls.fail({{"git_branch_delete", GIT_ERROR}});
+    failureOf([this] { branches().deleteBranch("topic"); });
+    EXPECT_EQ(repository_.line({"config", "branch.topic.remote"}), "o");
 }
 
 TEST_F(CallsOnBranches, DeleteNoBranchThatIsMadeMeanwhile)

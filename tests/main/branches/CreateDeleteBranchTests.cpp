@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: MIT
 #include <cstddef>
 #include <filesystem>
+#include <fstream>
+#include <ostream>
 #include <string>
 #include <type_traits>
 
@@ -179,6 +181,89 @@ TEST_F(DeleteBranch, KeepsTheModeOfTheConfiguration)
             }
         }
     }
+}
+
+/// A branch, more of the repository's own configuration, and the user's configuration.
+struct SettingsCase
+{
+    const char *sentence;
+    const char *branch;
+    const char *settings;
+    const char *global;
+};
+
+void PrintTo(const SettingsCase &row, std::ostream *stream)
+{
+    *stream << row.sentence;
+}
+
+class SettingsOfADeletedBranch : public DeleteBranch,
+                                 public testing::WithParamInterface<SettingsCase>
+{
+  protected:
+    static void append(const std::filesystem::path &path, const char *text)
+    {
+        std::ofstream(path, std::ios_base::app) << text;
+    }
+};
+
+TEST_P(SettingsOfADeletedBranch, AreRemovedAsByGit)
+{
+    const auto &[sentence, branch, settings, global] = GetParam();
+    repository_.git({"branch", branch});
+    append(repository_ / ".git/included", "[branch \"topic\"]\n\trebase = true\n");
+    append(repository_ / ".git/config", settings);
+    append(environment().home() / ".gitconfig", global);
+    std::filesystem::copy(repository_.path(), folder() / "twin",
+                          std::filesystem::copy_options::recursive);
+    const GitRepository twin(folder() / "twin");
+    twin.git({"branch", "--quiet", "-D", branch});
+    drop(branch);
+    EXPECT_EQ(repository_.git({"config", "--list"}), twin.git({"config", "--list"}));
+    EXPECT_EQ(repository_.git({"for-each-ref"}), twin.git({"for-each-ref"}));
+}
+
+const SettingsCase settingsCases[] = {
+    {"OfAnOrdinaryBranch", "topic",
+     "[branch \"topic\"]\n\tremote = o\n\tmerge = refs/heads/topic\n", ""},
+    {"WithoutThoseOfABranchWithADot", "1",
+     "[branch \"1\"]\n\tremote = o\n[branch \"1.2\"]\n\tremote = o\n", ""},
+    {"WithoutThoseOfSimilarSections", "topic",
+     "[subbranch \"topic\"]\n\tkey = 1\n[branch \"Topic\"]\n\tkey = 2\n[branch]\n\ttopic = 3\n"
+     "[branch \"topic\"]\n\tkey = 4\n",
+     ""},
+    {"WithSeveralValues", "topic",
+     "[branch \"topic\"]\n\tremote = o\n\tbase = 1\n\tbase = 2\n\tmerge = m\n", ""},
+    {"InSeveralSections", "topic",
+     "[branch \"topic\"]\n\tremote = o\n[core]\n\tx = y\n[branch \"topic\"]\n\tbase = 2\n", ""},
+    {"WithoutThoseOfTheUser", "topic", "[branch \"topic\"]\n\tremote = o\n",
+     "[branch \"topic\"]\n\trebase = true\n"},
+    {"OfTheUserAlone", "topic", "", "[branch \"topic\"]\n\trebase = true\n"},
+    {"WithoutThoseOfAnIncludedFile", "topic",
+     "[include]\n\tpath = included\n[branch \"topic\"]\n\tremote = o\n", ""},
+    {"WithoutValues", "topic", "[branch \"topic\"]\n\tdescription\n\tremote = \n", ""},
+    {"ThatAnIncludedFileHasToo", "topic",
+     "[include]\n\tpath = included\n[branch \"topic\"]\n\trebase = false\n", ""},
+};
+
+INSTANTIATE_TEST_SUITE_P(It, SettingsOfADeletedBranch, testing::ValuesIn(settingsCases),
+                         [](const auto &row) { return row.param.sentence; });
+
+TEST_F(DeleteBranch, FailsIfItsSettingsCannotBeRemoved)
+{
+    repository_.git({"branch", "topic"});
+    repository_.git({"config", "branch.topic.remote", "o"});
+    repository_.write(".git/config.lock", "");
+    const Failure failure = failureOfDelete("topic");
+    EXPECT_EQ(failure.code, GIT_ELOCKED);
+    EXPECT_THAT(failure.text, HasSubstr("config.lock"));
+    repository_.remove(".git/config.lock");
+    const std::string before = repository_.read(".git/config");
+    repository_.write(".git/config", before + std::string("[x]\n\ty = a\0b\n", 13));
+    EXPECT_THAT(failureOfDelete("topic").text, HasSubstr("NUL"));
+    repository_.write(".git/config", before + "[branch \"topic\"]\n\tkey = 1\n\tkey\n");
+    EXPECT_THAT(failureOfDelete("topic").text, HasSubstr("without a value"));
+    EXPECT_EQ(idOf("topic"), idOf("main"));
 }
 
 TEST_F(DeleteBranch, FailsForTheCurrentBranchOfThisOrALinkedWorktree)

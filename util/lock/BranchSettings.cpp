@@ -1,0 +1,168 @@
+// SPDX-License-Identifier: MIT
+#include "util/lock/BranchSettings.hpp"
+
+#include <algorithm>
+#include <cstddef>
+#include <fstream>
+#include <iterator>
+#include <map>
+#include <utility>
+
+#include <git2/config.h>
+#include <git2/errors.h>
+#include <git2/repository.h>
+#include <git2/sys/repository.h>
+#include <git2/transaction.h>
+
+#include "error/errorUtil/GitResult.hpp"
+#include "error/errorUtil/callbackException.hpp"
+#include "error/errorUtil/raiseGitError.hpp"
+
+namespace vclink::git
+{
+namespace
+{
+
+std::string pathOfConfiguration(git_repository *repository)
+{
+    return git_repository_commondir(repository) + std::string("config");
+}
+
+/// What the configuration has of one key.
+struct Values
+{
+    /// In the file itself.
+    std::size_t own = 0;
+    /// With those of included files.
+    std::size_t all = 0;
+    bool isOneMissing = false;
+};
+
+using Settings = std::map<std::string, Values>;
+
+struct Search
+{
+    std::string section;
+    Settings found;
+};
+
+/// The name of a setting itself has no dots.
+bool isOfSection(const std::string &key, const std::string &section)
+{
+    return key.compare(0, section.size(), section) == 0 &&
+           key.find('.', section.size()) == std::string::npos;
+}
+
+int note(const git_config_entry *entry, void *payload) noexcept
+{
+    try
+    {
+        auto &search = *static_cast<Search *>(payload);
+        if (isOfSection(entry->name, search.section))
+        {
+            Values &values = search.found[entry->name];
+            ++values.all;
+            values.own += entry->include_depth == 0 ? 1 : 0;
+            values.isOneMissing = values.isOneMissing || entry->value == nullptr;
+        }
+        return 0;
+    }
+    catch (...)
+    {
+        return parkCallbackException();
+    }
+}
+
+/// Returns what the file itself sets, and not only those that it includes.
+Settings findSettings(git_config *config, const std::string &branch)
+{
+    Search search{"branch." + branch + '.', {}};
+    check(git_config_foreach, config, note, &search);
+    Settings &found = search.found;
+    for (auto next = found.begin(); next != found.end();)
+    {
+        next = next->second.own == 0 ? found.erase(next) : std::next(next);
+    }
+    return std::move(found);
+}
+
+/// Neither call suits all: the first refuses several values, and the second ends the process if a
+/// key has no value at all.
+void removeFrom(git_config *config, const std::string &key, const Values &values)
+{
+    if (values.all == 1)
+    {
+        check(git_config_delete_entry, config, key.c_str());
+    }
+    else if (!values.isOneMissing)
+    {
+        check(git_config_delete_multivar, config, key.c_str(), ".*");
+    }
+    else
+    {
+        raiseGitError(GIT_ERROR, GIT_ERROR_CONFIG,
+                      "'" + key + "' is set several times, and once without a value");
+    }
+}
+
+/// libgit2 would cut off the file there.
+void refuseNulIn(const std::string &path)
+{
+    std::ifstream file(path, std::ios_base::binary);
+    if (std::find(std::istreambuf_iterator<char>(file), {}, '\0') !=
+        std::istreambuf_iterator<char>())
+    {
+        raiseGitError(GIT_ERROR, GIT_ERROR_CONFIG,
+                      "'" + path +
+                          "' contains a NUL character: remove the branch with 'git branch'");
+    }
+}
+
+} // namespace
+
+BranchSettings::BranchSettings(git_repository *repository, const std::string &branch)
+    : mode_(pathOfConfiguration(repository)),
+      file_(acquire<git_config>(git_config_open_ondisk, pathOfConfiguration(repository).c_str())
+                .value()),
+      lock_(nullptr, git_transaction_free)
+{
+    const Settings settings = findSettings(file_.get(), branch);
+    if (settings.empty())
+    {
+        return;
+    }
+    refuseNulIn(pathOfConfiguration(repository));
+    git_transaction *raw = nullptr;
+    const GitResult<void> locked = call(git_config_lock, &raw, file_.get());
+    lock_.reset(raw);
+    check(locked);
+    for (const auto &[key, values] : settings)
+    {
+        removeFrom(file_.get(), key, values);
+    }
+}
+
+BranchSettings::~BranchSettings() = default;
+
+void BranchSettings::remove()
+{
+    if (lock_ != nullptr)
+    {
+        check(git_transaction_commit, lock_.get());
+    }
+}
+
+WithoutConfiguration::WithoutConfiguration(git_repository *repository)
+    : repository_(repository),
+      before_(acquire<git_config>(git_repository_config, repository).value())
+{
+    const OwnedHandle<git_config> none = acquire<git_config>(git_config_new).value();
+    check(git_repository_set_config, repository, none.get());
+}
+
+WithoutConfiguration::~WithoutConfiguration()
+{
+    git_repository_set_config(repository_, before_.get());
+}
+
+} // namespace vclink::git
