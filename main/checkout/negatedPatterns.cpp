@@ -45,6 +45,26 @@ bool matchesAnElement(const std::string &pattern, const std::string &name)
     return false;
 }
 
+/// Whether libgit2 takes the line for another pattern than git does. It removes tabs at the end,
+/// and stops at a form feed; git does neither, and the pattern then hardly ever matches anything.
+bool isReadOtherwise(const std::string &line)
+{
+    const auto last = line.find_last_not_of(" \r");
+    return line.find_first_of("\v\f") != std::string::npos ||
+           (last != std::string::npos && line[last] == '\t');
+}
+
+bool isDoubtful(const std::string &line, const std::string &name)
+{
+    const bool isNegated = !line.empty() && line.front() == '!';
+    if (!isNegated && !isReadOtherwise(line))
+    {
+        return false;
+    }
+    const std::string pattern = line.substr(isNegated ? 1 : 0);
+    return matchesAnElement(lastElement(pattern.substr(0, pattern.find_first_of("\v\f"))), name);
+}
+
 bool mayNegate(const std::string &path, const std::string &name)
 {
     std::ifstream file(path);
@@ -58,8 +78,7 @@ bool mayNegate(const std::string &path, const std::string &name)
         {
             line.erase(0, 3);
         }
-        if (!line.empty() && line.front() == '!' &&
-            matchesAnElement(lastElement(line.substr(1)), name))
+        if (isDoubtful(line, name))
         {
             return true;
         }
@@ -85,6 +104,12 @@ std::string excludesFile(git_repository *repository)
     return {path.ptr, path.size};
 }
 
+/// git does not follow a link in the working tree.
+bool mayNegateInTree(const std::string &path, const std::string &name)
+{
+    return standingAt(path) == Standing::Link || mayNegate(path, name);
+}
+
 std::string inEnvironment(const char *variable, const char *path)
 {
     const char *const folder = std::getenv(variable);
@@ -98,16 +123,20 @@ bool mayBeNegated(git_repository *repository, const std::string &root, const std
     for (const std::string &path :
          {git_repository_commondir(repository) + std::string("info/exclude"),
           excludesFile(repository), inEnvironment("XDG_CONFIG_HOME", "/git/ignore"),
-          inEnvironment("HOME", "/.config/git/ignore"), root + ".gitignore"})
+          inEnvironment("HOME", "/.config/git/ignore")})
     {
         if (!path.empty() && mayNegate(path, name))
         {
             return true;
         }
     }
+    if (mayNegateInTree(root + ".gitignore", name))
+    {
+        return true;
+    }
     for (auto end = name.find('/'); end != std::string::npos; end = name.find('/', end + 1))
     {
-        if (mayNegate(root + name.substr(0, end) + "/.gitignore", name))
+        if (mayNegateInTree(root + name.substr(0, end) + "/.gitignore", name))
         {
             return true;
         }

@@ -10,7 +10,9 @@ namespace vclink::git
 
 /// Returns true if a pattern that begins with '!' may exempt a file from being ignored. libgit2
 /// does not apply such a pattern unless it negates another one of the same file, so that it takes
-/// untracked files for ignored ones. Also returns true if a file with patterns cannot be read.
+/// untracked files for ignored ones. Also returns true if a file with patterns cannot be read, or
+/// is a symbolic link in the working tree, which git does not follow, or has a pattern that has
+/// another meaning in git, such as one with a tab at its end.
 /// @param root the working tree, with a slash at its end
 /// @param name relative to the root
 /// @throws LibGit2Exception if the setting `core.excludesFile` cannot be read

@@ -69,8 +69,35 @@ INSTANTIATE_TEST_SUITE_P(
                     Negation{{"ANestedFile"}, "d/x.log", "*.log\n", "!x.log\n"},
                     Negation{{"ANestedFileFromItsFolder"}, "d/x.log", "*.log\n", "!/x.log\n"},
                     Negation{{"AnotherFile"}, "x.log", "!x.log\n", "", "*.log\n"},
-                    Negation{{"AFolderAbove"}, "d/e/a", "d/*/a\n", "!e/a\n"}),
+                    Negation{{"AFolderAbove"}, "d/e/a", "d/*/a\n", "!e/a\n"},
+                    // No negations, but also other patterns for libgit2 than for git.
+                    Negation{{"ATabAtTheEnd"}, "x.log", "*.log\t\n"},
+                    Negation{{"ATabAndACarriageReturn"}, "x.log", "x.log \t \r\n"},
+                    Negation{{"AFormFeed"}, "d/x.log", "d/*.log\f# logs\n"}),
     testing::PrintToStringParamName());
+
+/// git does not follow the link.
+class LinkedPatterns : public ObstacleFixture, public testing::WithParamInterface<std::string>
+{
+};
+
+TEST_P(LinkedPatterns, KeepUntrackedFilesAsInGit)
+{
+    repository_.write("patterns", "*.log\n");
+    repository_.symlink((repository_ / "patterns").string(), GetParam());
+    repository_.commitAll("patterns");
+    makeBranch("topic", writes("d/x.log", "theirs\n") + runsGit({"add", "--force", "d/x.log"}));
+    repository_.write("d/x.log", "mine\n");
+    const Failure failure = inTheWay("untracked file 'd/x.log'");
+    expectSwitchRefused(failure);
+    repository_.remove("d/x.log");
+    repository_.commitAll(writes("ours", "x"), "ours");
+    repository_.write("d/x.log", "mine\n");
+    expectMergeRefused(failure);
+}
+
+INSTANTIATE_TEST_SUITE_P(In, LinkedPatterns, testing::Values(".gitignore", "d/.gitignore"),
+                         [](const auto &row) { return row.index == 0 ? "TheRoot" : "AFolder"; });
 
 /// Overwritten by a merge, as in git.
 class IgnoredFiles : public ObstacleFixture
