@@ -60,22 +60,35 @@ class SideFile
     ScopedCleanup cleanup_;
 };
 
-/// A link could lead to any file of the user, which the commit would then contain.
-void refuseLink(const upath &file)
+/// Returns what must not be opened. A link could lead to any file of the user, which the commit
+/// would then contain. A FIFO is never read to its end, and a socket would count as an empty file.
+const char *describeObstacle(mode_t mode)
+{
+    if (S_ISLNK(mode))
+    {
+        return "symbolic link";
+    }
+    return S_ISREG(mode) || S_ISDIR(mode) ? nullptr : "FIFO, socket or device";
+}
+
+void refuseObstacle(const upath &file)
 {
     const std::string name = fl::i18n::ustring_to_utf8(file.string());
     struct stat status = {};
-    if (::lstat(name.c_str(), &status) == 0 && S_ISLNK(status.st_mode))
+    const char *const obstacle =
+        ::lstat(name.c_str(), &status) == 0 ? describeObstacle(status.st_mode) : nullptr;
+    if (obstacle != nullptr)
     {
         raiseGitError(GIT_ERROR, GIT_ERROR_MERGE,
-                      "a symbolic link is in the place of the merged file '" + name + "'");
+                      std::string("a ") + obstacle + " is in the place of the merged file '" +
+                          name + "'");
     }
 }
 
 /// Intentionally treats an unreadable file as an empty one.
 std::vector<char> readFile(const upath &file)
 {
-    refuseLink(file);
+    refuseObstacle(file);
     fl::filesystem::basic_ifstream<char> stream(file.string(),
                                                 std::ios_base::in | std::ios_base::binary);
     return std::vector<char>(std::istreambuf_iterator<char>(stream),

@@ -53,6 +53,21 @@ TEST_F(MergeDriverFailure, IsOneWhenALinkIsInThePlaceOfTheMergedFile)
     EXPECT_FALSE(std::filesystem::exists(secret + "-missing"));
 }
 
+/// A FIFO would be waited for without an end.
+TEST_F(MergeDriverFailure, IsOneWhenAFifoOrASocketIsInThePlaceOfTheMergedFile)
+{
+    makeConflict();
+    const std::string bind = "import socket, sys; socket.socket(socket.AF_UNIX).bind(sys.argv[1])";
+    for (const std::string &making : {std::string("mkfifo"), "python3 -c '" + bind + "'"})
+    {
+        defineScript("tool", "rm \"$2\"; " + making + " \"$2\"");
+        const auto failure = failureOf([this] { mergeOrThrow(); });
+        EXPECT_EQ(failure.errorClass, GIT_ERROR_MERGE) << making;
+        EXPECT_THAT(failure.text, testing::StartsWith("a FIFO, socket or device is in the place"));
+        EXPECT_EQ(staged("file"), "ours\n");
+    }
+}
+
 TEST_F(MergeDriverFailure, IsLibGit2sWhenTheConfigurationCannotBeRead)
 {
     makeConflicts({"a", "b"}, "* merge=tool\n");
