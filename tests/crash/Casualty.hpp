@@ -10,11 +10,11 @@
 namespace vclink::test
 {
 
-/// A worker process that is killed in the midst of its work.
+/// A worker process that is killed while it works.
 class Casualty
 {
   public:
-    /// Something that the worker said.
+    /// A report of the worker.
     struct Report
     {
         bool isEnd;

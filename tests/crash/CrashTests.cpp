@@ -81,7 +81,7 @@ class Crash : public GitFixture
             concludeMerge();
         Comparison(workplace_.repository(), random_.below(1U << 30)).compareAll();
     }
-    /// By both roads: as if nothing had happened, and, where that is refused, as is told.
+    /// Commits as if nothing had happened. If that is refused, follows the text of the refusal.
     void concludeMerge()
     {
         ++merging_[interrupted_];
@@ -154,7 +154,7 @@ class Crash : public GitFixture
     /// Kills inside that left a lock, and a merge under way.
     Counts locked_;
     Counts merging_;
-    /// Kills that left a merge which no commit may conclude.
+    /// Kills that left a merge that no commit may conclude.
     Counts refused_;
     std::set<std::string> commits_;
     std::set<std::string> pushed_;
@@ -163,7 +163,7 @@ class Crash : public GitFixture
 TEST_F(Crash, LosesNothingAndTheNextOperationWorks)
 {
     const auto kills = static_cast<std::size_t>(numberFrom("VCLINK_KILLS", 30));
-    // Some more where the machine was too slow or too fast for the moments that were chosen.
+    // Some more for operations that no kill has hit yet: machines differ in speed.
     const std::size_t most = kills + 5 * operations.size();
     for (std::size_t kill = 0; kill < most && !HasFailure(); ++kill)
     {
@@ -176,7 +176,7 @@ TEST_F(Crash, LosesNothingAndTheNextOperationWorks)
             recover();
     }
     report();
-    // Else it proves nothing.
+    // With fewer kills inside, the test proves nothing.
     EXPECT_GE(sumOf(killsInside()) * 2, kills);
     for (const auto &operation : operations)
         EXPECT_EQ(killsInside().count(operation), 1U) << "no kill fell into " << operation;

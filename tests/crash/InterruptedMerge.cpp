@@ -87,7 +87,7 @@ void InterruptedMerge::beginAgain()
     followWayOut();
     expectOwnWork();
     EXPECT_EQ(repository_.line({"rev-parse", "HEAD"}), ours);
-    // The merge refuses over edits, wherever they are.
+    // A merge refuses because of any edit.
     repository_.git({"checkout", "--quiet", "HEAD", "--", "file"});
     EXPECT_EQ(repository_.git({"status", "--porcelain"}), "?? notes\n");
     try
@@ -125,7 +125,7 @@ void InterruptedMerge::followWayOut()
     EXPECT_EQ(result.errors, "") << wayOut;
 }
 
-/// What only one side has changed is as that side has it, and what both have is as neither has it.
+/// Files that one side has changed are as on that side; files that both have changed are merged.
 void InterruptedMerge::expectBothSides() const
 {
     ASSERT_TRUE(repository_.tryGit({"rev-parse", "--verify", "HEAD^2"}).succeeded());

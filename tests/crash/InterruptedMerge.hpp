@@ -8,10 +8,10 @@
 namespace vclink::test
 {
 
-/// What a person does who finds a merge of "topic" that was killed, its locks removed: notes
-/// something in a new file, edits one that the merge does not touch, and goes on by one road or the
-/// other. The running test fails if the history says "merged" without the work of both sides, or if
-/// what the person wrote is lost.
+/// What a person does after a merge of "topic" was killed and its locks are removed: writes a new
+/// file, edits one that the merge does not touch, and either commits or begins again. The running
+/// test fails if the history says "merged" without the work of both sides, or if anything that the
+/// person wrote is lost.
 class InterruptedMerge
 {
   public:
@@ -20,7 +20,7 @@ class InterruptedMerge
     /// Commits by the library, as if nothing had happened.
     /// @return false when it refuses
     bool commit();
-    /// Follows the words of that refusal, and merges again by the library.
+    /// Runs the commands in the text of the refusal, and merges again with the library.
     void beginAgain();
 
   private:
@@ -30,7 +30,7 @@ class InterruptedMerge
     void expectBothSides() const;
 
     GitRepository repository_;
-    /// what the person writes begins so, another time after each crash
+    /// the beginning of what the person writes, different after each crash
     std::string own_;
     /// that the commit was refused with
     std::string refusal_;

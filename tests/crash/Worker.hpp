@@ -36,7 +36,7 @@ class Worker
     void change(const std::string &folder, int files = 25);
     void commit();
     /// Leaves on "topic" what main lacks, and HEAD on main.
-    /// With files that main will change as well, and that a command merges, if it is driven.
+    /// If it is driven, with files that main will change too, and that a command merges.
     void advanceTopic(bool isDriven);
     void revertAll();
     void removeUnversioned();

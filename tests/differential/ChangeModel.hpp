@@ -16,9 +16,9 @@ namespace vclink::test
 using Names = std::vector<std::string>;
 
 /// What the library owes for each change of a working copy, carried out with the git command line.
-/// From git's report comes whether a change is refused, and which paths a list means; git then
-/// makes the change to exactly these. The rules by which that is not what git does with the same
-/// list:
+/// git's report decides whether a change is refused, and which paths a list means; git then makes
+/// the change to exactly these. These are the rules in which the result differs from what git does
+/// with the same list:
 ///
 /// - Whether a file is added, removed or reverted goes by its state; see expectedStates().
 /// - A file that was moved as it is goes by its old name. The new one stays when it is removed.

@@ -99,8 +99,8 @@ DriverCase definedIn(const std::string &name, const std::vector<std::string> &fi
                       });
 }
 
-/// A driver that the system's file defines, where no name of a file below the home folder is given
-/// that has the command instead.
+/// A driver that the system's configuration file defines, and none of the files below the home
+/// folder.
 DriverCase inTheSystemFile(const std::string &name, const std::string &other)
 {
     return configured(name,

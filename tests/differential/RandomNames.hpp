@@ -10,9 +10,9 @@
 namespace vclink::test
 {
 
-/// Makes paths of files, relative and with slashes. Most of them are what people use; the others
-/// hold whatever a name may hold: blanks and line ends at any place, characters that mean something
-/// to a shell, a pattern or a configuration file, text outside ASCII, bytes that are no text.
+/// Makes paths of files, relative and with slashes. Most are names that people use; the others
+/// contain everything that a name can: blanks and line ends in any place, special characters of
+/// shells, patterns and configuration files, text outside ASCII, bytes that are not UTF-8.
 class RandomNames
 {
   public:

@@ -22,8 +22,8 @@ struct Snapshot
     Entries history;
     /// The files of an operation that is under way, and locks.
     Entries underWay;
-    /// Inode and time of change of each file and link: two that are equal tell that nobody wrote
-    /// it between them.
+    /// Inode and time of change of each file and link: if both are equal, nobody wrote it in
+    /// between.
     Entries stamps;
     /// The ids of what the files and links hold, and of the index's entries.
     Entries fileIds;

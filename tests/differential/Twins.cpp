@@ -125,7 +125,7 @@ std::string Twins::commit(const std::string &message)
         }
         catch (const git::LibGit2Exception &exception)
         {
-            // A merge of which nothing was kept: that is meant here, and git does it.
+            // A merge of which nothing was kept: intended here, and git commits it.
             const std::string text = asUtf8(exception.getError().getMessage());
             if (text.find("run: git commit") == std::string::npos)
                 throw;

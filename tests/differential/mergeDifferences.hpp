@@ -62,7 +62,7 @@ class MergeExplanations
     bool areSidesAsTheyWere(const std::multiset<std::string> &entries) const;
     bool isAnotherInEachBase(const std::string &path) const;
 
-    /// Of each merge base, of ours and of theirs, mode and id by path.
+    /// The mode and id by path, for each merge base, ours and theirs.
     std::vector<Files> bases_;
     Files ours_;
     Files theirs_;

@@ -80,7 +80,7 @@ void expectStatesOfGit(const vclink::test::Trial &trial)
     EXPECT_EQ(states, expectedStates(report, blobs, isFile));
 }
 
-/// Whether an operation that fails may do something else and not tell.
+/// Whether a failing operation may do something else without reporting it.
 bool mayDoOtherwise(const std::string &operation)
 {
     const std::array<std::string, 5> operations{

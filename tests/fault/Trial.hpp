@@ -68,7 +68,7 @@ class Trial
   private:
     /// Every file but objects, which nobody misses who has no reference to them.
     RepositoryState::Entries files() const;
-    /// Whether libgit2 forgets this lock where a call below it fails in the midst of writing:
+    /// Whether libgit2 leaves this lock if a call below it fails in the middle of its writing:
     /// FETCH_HEAD's, MERGE_MSG's, and that of a file in conflict, which it leaves open besides.
     bool isLeftByLibGit2(const std::filesystem::path &file) const;
     void removeWhatLibGit2Leaves() const;

@@ -28,11 +28,11 @@ class InstalledFixture : public GitFixture
     void install(const std::filesystem::path &prefix,
                  const std::vector<std::string> &components) const;
     /// Installs all that a host's developer needs, and moves it elsewhere.
-    /// @return where it lies then
+    /// @return the new place
     std::filesystem::path installAndMove() const;
 
-    /// A configuration and a build of a project against what lies in `prefix`, in a new folder,
-    /// which is given.
+    /// Configures and builds a project against the installation in `prefix`, in a new folder.
+    /// @return that folder
     std::filesystem::path buildAgainst(const std::filesystem::path &prefix,
                                        const std::filesystem::path &project) const;
 

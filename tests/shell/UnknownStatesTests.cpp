@@ -106,7 +106,7 @@ TEST_F(ShellUnknownStates, AreSaidToBeBeforeTheFirstCommitToo)
     EXPECT_THAT(errorsOf({"status"}), StartsWith("vclink-shell: " + reason()));
 }
 
-/// In an empty repository, and where Git ignores every file.
+/// In an empty repository, and in one in which Git ignores every file.
 TEST_F(ShellUnknownStates, AreNotThoseOfAWorkingCopyWithoutFilesForGit)
 {
     const GitRepository young = makeRepository("young");

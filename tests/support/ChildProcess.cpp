@@ -18,8 +18,8 @@ namespace vclink::test
 namespace
 {
 
-/// Comes after what the action answered, so that a child that ended early is told from one whose
-/// answer is empty.
+/// Follows the action's answer, so that a child that ended early differs from one with an empty
+/// answer.
 constexpr char endOfAnswer = '\0';
 
 [[noreturn]] void failAt(const char *what)

@@ -89,7 +89,7 @@ NewRepository askGitForNewRepository()
     return made;
 }
 
-/// The id of the commit at HEAD, which was just made, so that its reference is a file of its own.
+/// The id of the new commit at HEAD. Its reference is not packed yet: it has its own file.
 std::string idOfNewCommit(const GitRepository &repository)
 {
     const std::string beginning = "ref: ";

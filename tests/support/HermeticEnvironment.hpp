@@ -16,9 +16,9 @@ namespace vclink::test
 /// agent or proxy; the locale is C.UTF-8.
 ///
 /// libgit2 remembers where it looks for configuration from its first start to its last shutdown. If
-/// it runs already, it is told of the new places here (and of the old ones at the end); if it
-/// starts later, it finds them in the environment, all but the system's configuration, for which
-/// it has no variable: see isolateLibGit2().
+/// it runs already, this object sets the new places (and the old ones at the end). If it starts
+/// later, it finds them in the environment, except the system's configuration, for which it has no
+/// variable: see isolateLibGit2().
 class HermeticEnvironment
 {
   public:

@@ -12,9 +12,9 @@
 namespace vclink::test
 {
 
-/// What a repository holds, as git's own commands and the file system tell it: taken before and
-/// after an operation, it shows what the operation changed. Only reads, and writes nothing. Objects
-/// that nothing refers to do not count.
+/// The content of a repository, as git's own commands and the file system report it. Two of them,
+/// before and after an operation, show what the operation changed. Writes nothing. Does not contain
+/// objects without a reference.
 struct RepositoryState
 {
     /// Names relative to the root as bytes, with the content.
@@ -46,8 +46,8 @@ bool operator==(const RepositoryState &left, const RepositoryState &right);
 bool operator!=(const RepositoryState &left, const RepositoryState &right);
 std::ostream &operator<<(std::ostream &stream, const RepositoryState &state);
 
-/// A file's identity, times and bytes: two that are equal tell that nobody wrote the file between
-/// them, not even with the same bytes. A missing file has one, too.
+/// A file's identity, times and bytes. If two are equal, nobody wrote the file in between, not even
+/// with the same bytes. A missing file has one, too.
 struct FileStamp
 {
     std::uintmax_t inode = 0;

@@ -1,10 +1,10 @@
 // SPDX-License-Identifier: MIT
 #include "libgit2Release.hpp"
 
-/// Asked for by the leak sanitizer. libgit2 up to 1.5 does not release what it matches a regular
-/// expression with when nothing matched, which is how it looks for submodules in a configuration.
-/// Of each ssh connection it leaves the list of known hosts behind, and libssh2 1.10 what a server
-/// says before it asks who is there. Weak, so that a program can answer otherwise.
+/// The leak sanitizer calls it. When libgit2 up to 1.5 looks for submodules in a configuration, it
+/// does not release a regular expression that matched nothing. For each ssh connection it does not
+/// release the list of known hosts, and libssh2 1.10 not what a server says before it asks for the
+/// user. Weak, so that a program can have its own.
 extern "C" __attribute__((visibility("default"), weak)) const char *
 leakSuppressions() __asm__("__lsan_default_suppressions");
 

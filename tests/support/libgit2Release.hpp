@@ -49,13 +49,13 @@ constexpr std::string_view noiseOfNames = isSince(1, 9) ? ",:;" : ".,:;";
 
 /// Between "could not find repository " and the folder.
 constexpr std::string_view whereNoRepositoryIs = isSince(1, 9) ? "at" : "from";
-/// Part of what is said of an address whose scheme nobody knows.
+/// A part of the text about an address with an unknown scheme.
 inline std::string refusalOfScheme(const std::string &address)
 {
     return isSince(1, 9) ? "invalid argument: 'port'" : address;
 }
 
-/// How it is told that an ssh server has had enough of keys.
+/// The text if an ssh server accepts no further keys.
 constexpr std::string_view endOfSshTries =
     isSince(1, 9) ? "Failed getting response"
                   : "Failed to retrieve list of SSH authentication methods";

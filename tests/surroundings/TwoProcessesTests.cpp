@@ -145,8 +145,8 @@ std::ostream &operator<<(std::ostream &stream, const Operation &operation)
     return stream << operation.name;
 }
 
-/// Each of the library's operations beside each of the peer's trades, on a working copy of its own
-/// each time. VCLINK_ROUNDS says how many times, VCLINK_SEED when the library begins.
+/// Each of the library's operations beside each operation of the peer, each time in a new working
+/// copy. VCLINK_ROUNDS sets how many times, VCLINK_SEED when the library begins.
 class TwoProcesses : public vclink::test::GitFixture, public testing::WithParamInterface<Operation>
 {
   protected:

@@ -40,7 +40,7 @@ struct Reason
     bool isOfSiblings = false;
 };
 
-/// Of some releases of git only.
+/// Reasons that apply only to some releases of git.
 std::vector<Reason> reasonsByRelease()
 {
     if (!git_release::deletesIgnoredFolders())

@@ -146,19 +146,19 @@ class LibGit2Recorder
     /// Makes these calls fail, and no others any more. If several apply, the first one does.
     void fail(std::vector<LibGit2Fault> faults);
 
-    /// Called with the name of each call, before anything else is done about it.
+    /// Called with the name of each call, before anything else happens.
     std::function<void(const std::string &name)> onCall;
 
-    /// Calls the hook with the arguments of each call of the function before the call goes on. One
-    /// hook a function; an empty std::function takes it away.
+    /// Calls the hook with the arguments of each call of the function before the call goes on. Each
+    /// function has one hook; an empty std::function removes it.
     template <auto Function> void on(typename detail::HooksOf<Function>::Hook hook)
     {
         place(hooks_, detail::nameOf<Function>(),
               hook ? std::make_shared<decltype(hook)>(std::move(hook)) : nullptr);
     }
-    /// Lets a test answer in libgit2's place. The answer is given libgit2's own function, which it
-    /// may call, and the arguments; `[](auto...) { return -1; }` fits any. An empty std::function
-    /// takes it away.
+    /// Lets a test answer instead of libgit2. The answer receives libgit2's own function, which it
+    /// can call, and the arguments; `[](auto...) { return -1; }` fits any. An empty std::function
+    /// removes the answer.
     template <auto Function> void answer(typename detail::HooksOf<Function>::Answer answer)
     {
         place(answers_, detail::nameOf<Function>(),
