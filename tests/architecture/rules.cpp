@@ -7,6 +7,8 @@
 #include <sstream>
 #include <utility>
 
+#include "support/strings.hpp"
+
 namespace vclink::test
 {
 namespace
@@ -93,11 +95,6 @@ bool isOfLibrary(const std::string &file)
 {
     static const std::set<std::string> layers{"include", "error", "util", "options", "main"};
     return layers.count(layerOf(file)) != 0;
-}
-
-bool startsWith(const std::string &text, const std::string &beginning)
-{
-    return text.compare(0, beginning.size(), beginning) == 0;
 }
 
 std::string included(const std::string &file, const std::string &name)

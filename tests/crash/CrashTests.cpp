@@ -18,6 +18,7 @@
 #include "differential/Random.hpp"
 #include "support/GitFixture.hpp"
 #include "support/LibGit2Session.hpp"
+#include "support/numberFrom.hpp"
 
 namespace
 {
@@ -28,18 +29,13 @@ using vclink::test::Comparison;
 using vclink::test::GitFixture;
 using vclink::test::InterruptedMerge;
 using vclink::test::LibGit2Session;
+using vclink::test::numberFrom;
 using vclink::test::Random;
 using vclink::test::Workplace;
 
 const std::vector<std::string> operations{
     "commit",      "revertFiles", "switchBranch", "mergeFastForward", "mergeThreeWay",
     "mergeDriven", "fetch",       "push",         "generate",         "writeConfig"};
-
-std::uint64_t numberFrom(const char *variable, std::uint64_t otherwise)
-{
-    const char *text = std::getenv(variable);
-    return text == nullptr ? otherwise : std::strtoull(text, nullptr, 10);
-}
 
 /// Workers that are killed one after the other. VCLINK_KILLS says how many, VCLINK_SEED when. With
 /// VCLINK_KEEP the workplace of a test that fails stays, beside where the test's folder was.

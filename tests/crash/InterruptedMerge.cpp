@@ -1,19 +1,16 @@
 // SPDX-License-Identifier: MIT
 #include "InterruptedMerge.hpp"
 
-#include <memory>
 #include <set>
-#include <sstream>
 #include <utility>
 
 #include <gtest/gtest.h>
 
 #include "differential/Snapshot.hpp"
-#include "support/TestInteractor.hpp"
+#include "support/adapterFor.hpp"
+#include "support/strings.hpp"
 #include "support/text.hpp"
-#include "vclink/CMAdapter.hpp"
 #include "vclink/git/BranchManager.hpp"
-#include "vclink/git/GitAdapterFactory.hpp"
 #include "vclink/git/GitException.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
 
@@ -22,27 +19,13 @@ namespace vclink::test
 namespace
 {
 
-std::unique_ptr<CMAdapter> makeAdapter(const GitRepository &repository)
-{
-    return git::GitAdapterFactory().createAdapterFor(asPath(repository.path()),
-                                                     std::make_shared<TestInteractor>());
-}
-
 using Lines = std::set<std::string>;
-
-Lines pathsIn(const std::string &text)
-{
-    Lines lines;
-    std::istringstream stream(text);
-    for (std::string line; std::getline(stream, line);)
-        lines.insert(line);
-    return lines;
-}
 
 /// The paths in which two trees differ.
 Lines changes(const GitRepository &repository, const std::string &from, const std::string &to)
 {
-    return pathsIn(repository.git({"diff-tree", "-r", "--name-only", from, to}));
+    const auto paths = split(repository.git({"diff-tree", "-r", "--name-only", from, to}));
+    return {paths.begin(), paths.end()};
 }
 
 /// The text between "working copy: " and the next remark is a line for the shell.
@@ -68,7 +51,7 @@ bool InterruptedMerge::commit()
     writeOwnWork();
     try
     {
-        makeAdapter(repository_)->commit(upath(), u"as it stands");
+        adapterFor(repository_)->commit(upath(), u"as it stands");
     }
     catch (const git::LibGit2Exception &exception)
     {
@@ -92,7 +75,7 @@ void InterruptedMerge::beginAgain()
     EXPECT_EQ(repository_.git({"status", "--porcelain"}), "?? notes\n");
     try
     {
-        git::BranchManager::create(*makeAdapter(repository_))->merge("topic");
+        git::BranchManager::create(*adapterFor(repository_))->merge("topic");
     }
     catch (const git::GitException &exception)
     {

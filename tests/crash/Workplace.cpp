@@ -1,10 +1,12 @@
 // SPDX-License-Identifier: MIT
 #include "Workplace.hpp"
 
-#include <sstream>
 #include <vector>
 
+#include <gmock/gmock.h>
 #include <gtest/gtest.h>
+
+#include "support/strings.hpp"
 
 namespace vclink::test
 {
@@ -24,20 +26,10 @@ std::string entriesOfUser()
     return entries;
 }
 
-std::set<std::string> linesOf(const std::string &text)
-{
-    std::set<std::string> lines;
-    std::istringstream stream(text);
-    for (std::string line; std::getline(stream, line);)
-        lines.insert(line);
-    return lines;
-}
-
 void expectReached(const GitRepository &repository, const std::set<std::string> &commits)
 {
-    const auto reached = linesOf(repository.tryGit({"rev-list", "--all"}).output);
-    for (const auto &commit : commits)
-        EXPECT_EQ(reached.count(commit), 1U) << commit << " is lost in " << repository.path();
+    const auto reached = split(repository.tryGit({"rev-list", "--all"}).output);
+    EXPECT_THAT(reached, testing::IsSupersetOf(commits)) << "lost in " << repository.path();
 }
 
 } // namespace

@@ -12,6 +12,7 @@
 #include "text.hpp"
 #include "transport/GitDaemon.hpp"
 #include "transport/ScriptedServer.hpp"
+#include "transport/ServerOfTheSuite.hpp"
 
 namespace
 {
@@ -21,32 +22,16 @@ using testing::HasSubstr;
 using vclink::desktop::fromUtf8;
 using vclink::desktop::toUtf8;
 
-/// The server outlives the environment of a test.
-class RunningDaemon
+class RemoteCommands : public ServerOfTheSuite<GitDaemon>, public DesktopFixture
 {
   protected:
-    RunningDaemon()
-    {
-        if (daemon == nullptr)
-            daemon = std::make_unique<GitDaemon>();
-    }
-    static std::unique_ptr<GitDaemon> daemon;
-};
-std::unique_ptr<GitDaemon> RunningDaemon::daemon;
-
-class RemoteCommands : private RunningDaemon, public DesktopFixture
-{
-  protected:
+    using ServerOfTheSuite<GitDaemon>::TearDownTestSuite;
     RemoteCommands()
     {
         repository_.write("a", "first\n");
         repository_.commitAll("first");
         repository_.git({"remote", "add", "origin", url_});
         repository_.git({"push", "--quiet", served_.path().string(), "main"});
-    }
-    static void TearDownTestSuite()
-    {
-        daemon.reset();
     }
     std::string servedId() const
     {
@@ -58,8 +43,8 @@ class RemoteCommands : private RunningDaemon, public DesktopFixture
         fill(values);
     }
 
-    GitRepository served_ = daemon->makeRepository();
-    std::string url_ = daemon->url(served_);
+    GitRepository served_ = server().makeRepository();
+    std::string url_ = server().url(served_);
 };
 
 TEST_F(RemoteCommands, FetchBringsTheBranches)

@@ -1,14 +1,13 @@
 // SPDX-License-Identifier: MIT
 #include "ChangeModel.hpp"
 
-#include <algorithm>
 #include <filesystem>
 #include <set>
-#include <stdexcept>
 #include <utility>
 
 #include "listedNames.hpp"
 #include "moves.hpp"
+#include "quoting.hpp"
 #include "support/text.hpp"
 
 namespace vclink::test
@@ -115,16 +114,11 @@ std::string ChangeModel::markResolved(const std::string &name)
 
 std::string ChangeModel::commit(const std::string &message)
 {
-    const Command command =
-        repository_
-            .command({"commit", "--quiet", "--all", "--allow-empty", "--allow-empty-message",
-                      "--no-verify", "--cleanup=verbatim", "--file=-"})
-            .input(message);
-    const CommandResult result = command.run();
-    if (!result.succeeded())
-    {
-        throw std::runtime_error(command.text() + ": " + result.errors);
-    }
+    repository_
+        .command({"commit", "--quiet", "--all", "--allow-empty", "--allow-empty-message",
+                  "--no-verify", "--cleanup=verbatim", "--file=-"})
+        .input(message)
+        .runOrThrow();
     return {};
 }
 
@@ -198,17 +192,7 @@ Names ChangeModel::meantBy(const Names &names,
 
 void ChangeModel::run(const std::vector<std::string> &arguments, const Names &paths) const
 {
-    std::string input;
-    for (const auto &path : paths)
-    {
-        input += path + '\0';
-    }
-    const Command command = repository_.command(arguments).input(input);
-    const CommandResult result = command.run();
-    if (!result.succeeded())
-    {
-        throw std::runtime_error(command.text() + ": " + result.errors);
-    }
+    repository_.command(arguments).input(joinWithNul(paths)).runOrThrow();
 }
 
 /// As `git add` does, also where a folder has taken the place of a file in conflict: that one

@@ -10,9 +10,9 @@
 #include <gtest/gtest.h>
 
 #include "ChangeSequence.hpp"
-#include "numberFrom.hpp"
 #include "support/GitFixture.hpp"
 #include "support/LibGit2Session.hpp"
+#include "support/numberFrom.hpp"
 
 namespace
 {

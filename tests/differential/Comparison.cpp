@@ -11,9 +11,8 @@
 #include "listedNames.hpp"
 #include "moves.hpp"
 #include "quoting.hpp"
-#include "support/TestInteractor.hpp"
+#include "support/adapterFor.hpp"
 #include "support/text.hpp"
-#include "vclink/git/GitAdapterFactory.hpp"
 
 namespace vclink::test
 {
@@ -54,9 +53,7 @@ std::string describeState(const States &states, const std::string &path)
 Comparison::Comparison(const GitRepository &repository, std::uint64_t seed)
     : repository_(repository), random_(seed), root_(repository.path().string()),
       status_(runGitStatus(repository)), report_(readGitReport(repository, status_)),
-      blobs_(readBlobs(repository, moveCandidates(report_))),
-      adapter_(git::GitAdapterFactory().createAdapterFor(asPath(root_),
-                                                         std::make_shared<TestInteractor>()))
+      blobs_(readBlobs(repository, moveCandidates(report_))), adapter_(adapterFor(repository))
 {
 }
 
@@ -107,13 +104,7 @@ void Comparison::compare(const std::string &asked, const FileStateMap &actual,
                          const Selection &isAsked) const
 {
     const States expected = expectedStates(report_, blobs_, isAsked);
-    States found;
-    for (const auto &[path, state] : actual)
-    {
-        const std::string text = asBytes(path);
-        ASSERT_EQ(text.substr(0, root_.size() + 1), root_ + '/');
-        found.emplace(text.substr(root_.size() + 1), state.getState());
-    }
+    const States found = statesByPath(root_, actual);
     if (found != expected)
     {
         ADD_FAILURE() << "asked for " << asked << '\n' << describe(found, expected);

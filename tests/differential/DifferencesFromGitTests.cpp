@@ -1,16 +1,14 @@
 // SPDX-License-Identifier: MIT
-#include <map>
-#include <memory>
 #include <string>
 
 #include <git2/errors.h>
 #include <gtest/gtest.h>
 
+#include "expectedStates.hpp"
 #include "support/GitFixture.hpp"
 #include "support/LibGit2Session.hpp"
-#include "support/TestInteractor.hpp"
+#include "support/adapterFor.hpp"
 #include "support/text.hpp"
-#include "vclink/git/GitAdapterFactory.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
 
 /// What the library says or does where git does something else, for states and changes that the
@@ -20,31 +18,16 @@ namespace
 
 using vclink::FileState;
 using vclink::git::LibGit2Exception;
-using vclink::test::asBytes;
 using vclink::test::asPath;
-using vclink::test::asUtf8;
 using vclink::test::GitRepository;
-using States = std::map<std::string, FileState::State>;
+using vclink::test::States;
 
 class DifferencesFromGit : public vclink::test::GitFixture
 {
   protected:
-    /// The states of the whole working copy, by path relative to its root.
-    States statesOf(const GitRepository &repository) const
+    static States statesOf(const GitRepository &repository)
     {
-        const std::string root = repository.path().string();
-        const auto adapter = makeAdapter(repository);
-        States states;
-        for (const auto &[path, state] : adapter->getFolderStates(asPath(root)))
-        {
-            states.emplace(asBytes(path).substr(root.size() + 1), state.getState());
-        }
-        return states;
-    }
-    static std::unique_ptr<vclink::CMAdapter> makeAdapter(const GitRepository &repository)
-    {
-        return vclink::git::GitAdapterFactory().createAdapterFor(
-            asPath(repository.path()), std::make_shared<vclink::test::TestInteractor>());
+        return vclink::test::statesOfAll(*adapterFor(repository));
     }
     static std::string statusOf(const GitRepository &repository)
     {
@@ -134,7 +117,7 @@ TEST_F(DifferencesFromGit, AFileThatTookTheirFoldersPlaceIsInTheWayOfARevert)
     repository.remove("folder");
     repository.write("folder", "instead");
     repository.git({"rm", "--quiet", "--cached", "folder/file"});
-    const auto adapter = makeAdapter(repository);
+    const auto adapter = adapterFor(repository);
     try
     {
         adapter->revertFiles({asPath(repository / "folder/file")});

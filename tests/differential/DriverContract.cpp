@@ -1,21 +1,20 @@
 // SPDX-License-Identifier: MIT
 #include "DriverContract.hpp"
 
+#include <algorithm>
 #include <filesystem>
-#include <fstream>
 #include <iostream>
-#include <memory>
 #include <ostream>
 #include <sstream>
 #include <utility>
 
 #include <gtest/gtest.h>
 
-#include "support/TestInteractor.hpp"
+#include "support/Scripts.hpp"
+#include "support/adapterFor.hpp"
+#include "support/strings.hpp"
 #include "support/text.hpp"
-#include "vclink/CMAdapter.hpp"
 #include "vclink/git/BranchManager.hpp"
-#include "vclink/git/GitAdapterFactory.hpp"
 #include "vclink/git/GitException.hpp"
 
 namespace vclink::test
@@ -54,9 +53,7 @@ DriverOutcome readOutcome(const GitRepository &repository)
 {
     DriverOutcome outcome;
     outcome.isInConflict = !repository.git({"ls-files", "--unmerged"}).empty();
-    std::istringstream lines(repository.git({"ls-files", "--stage"}));
-    for (std::string line; std::getline(lines, line);)
-        outcome.index.push_back(line);
+    outcome.index = split(repository.git({"ls-files", "--stage"}));
     for (auto entry = fs::recursive_directory_iterator(repository.path());
          entry != fs::recursive_directory_iterator(); ++entry)
     {
@@ -190,18 +187,10 @@ std::ostream &operator<<(std::ostream &stream, const DriverCase &driverCase)
     return stream << driverCase.name;
 }
 
-Change writes(const std::string &name, const std::string &bytes)
+DriverCase runs(const std::string &name, const std::string &script,
+                const DriverExpectation &expectation)
 {
-    return [name, bytes](const GitRepository &repository) { repository.write(name, bytes); };
-}
-
-Change both(const Change &first, const Change &second)
-{
-    return [first, second](const GitRepository &repository)
-    {
-        first(repository);
-        second(repository);
-    };
+    return {name, "%T %O %A %B", script, expectation};
 }
 
 GitRepository makeRepositoryOf(const DriverCase &driverCase, const fs::path &folder,
@@ -220,17 +209,18 @@ GitRepository makeRepositoryOf(const DriverCase &driverCase, const fs::path &fol
     driverCase.ours(repository);
     repository.commitAll("ours");
 
-    const std::string script = folder / "script";
-    std::ofstream(script) << "#!/bin/sh\n" << driverCase.script << '\n';
-    fs::permissions(script, fs::perms(0755));
     std::string command = driverCase.command;
     const auto placeholder = command.find("%T");
     if (placeholder != std::string::npos)
-        command.replace(placeholder, 2, script);
+        command.replace(placeholder, 2, Scripts(folder / "scripts").shell(driverCase.script));
+    for (auto arguments : driverCase.settings)
+    {
+        std::replace(arguments.begin(), arguments.end(), std::string("%C"), command);
+        arguments.insert(arguments.begin(), "config");
+        repository.git(arguments);
+    }
     if (driverCase.configure)
         driverCase.configure(repository, environment, command);
-    else
-        repository.git({"config", "merge.tool.driver", command});
     return repository;
 }
 
@@ -245,9 +235,7 @@ DriverOutcome mergeByGit(const GitRepository &repository)
 
 DriverOutcome mergeByLibrary(const GitRepository &repository)
 {
-    const auto interactor = std::make_shared<TestInteractor>();
-    const auto adapter =
-        git::GitAdapterFactory().createAdapterFor(asPath(repository.path()), interactor);
+    const auto adapter = adapterFor(repository);
     std::string failure;
     try
     {

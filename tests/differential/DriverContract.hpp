@@ -8,6 +8,7 @@
 #include <string>
 #include <vector>
 
+#include "support/Change.hpp"
 #include "support/GitRepository.hpp"
 #include "support/HermeticEnvironment.hpp"
 
@@ -64,13 +65,6 @@ struct DriverExpectation
     std::string library{};
 };
 
-using Change = std::function<void(const GitRepository &)>;
-
-/// Writes a whole file.
-Change writes(const std::string &name, const std::string &bytes);
-/// The one change after the other.
-Change both(const Change &first, const Change &second);
-
 /// One configuration of attributes, driver and sides. "%T" in the driver's command is the path of
 /// the script.
 struct DriverCase
@@ -84,12 +78,19 @@ struct DriverCase
     Change base = writes("file", "base\n");
     Change ours = writes("file", "ours\n");
     Change theirs = writes("file", "theirs\n");
-    /// done with the command in place of configuring it in the repository
-    std::function<void(const GitRepository &, const HermeticEnvironment &, const std::string &)>
+    /// what `git config` is given, "%C" being the command
+    std::vector<std::vector<std::string>> settings{{"merge.tool.driver", "%C"}};
+    /// what else there is to be configured
+    std::function<void(const GitRepository &, const HermeticEnvironment &,
+                       const std::string &command)>
         configure{};
 };
 
 std::ostream &operator<<(std::ostream &stream, const DriverCase &driverCase);
+
+/// A driver that is given all three sides.
+DriverCase runs(const std::string &name, const std::string &script,
+                const DriverExpectation &expectation = {});
 
 /// The cases, by what they are about.
 std::vector<DriverCase> placeholderCases();

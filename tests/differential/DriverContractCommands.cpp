@@ -26,9 +26,7 @@ printf '%s\n' "$text" >"$target")";
 DriverCase describes(const std::string &name, const std::string &words,
                      const DriverExpectation &expectation = {})
 {
-    DriverCase result{name, "%T " + words, describing};
-    result.expectation = expectation;
-    return result;
+    return {name, "%T " + words, describing, expectation};
 }
 
 DriverCase describesPath(const std::string &name, const std::string &words, const std::string &file,
@@ -39,14 +37,6 @@ DriverCase describesPath(const std::string &name, const std::string &words, cons
     result.base = writes(file, "base\n");
     result.ours = writes(file, "ours\n");
     result.theirs = writes(file, "theirs\n");
-    return result;
-}
-
-DriverCase runs(const std::string &name, const std::string &script,
-                const DriverExpectation &expectation = {})
-{
-    DriverCase result{name, "%T %O %A %B", script};
-    result.expectation = expectation;
     return result;
 }
 

@@ -12,46 +12,10 @@ namespace
 
 using Kind = DriverExpectation;
 
-DriverCase leaves(const std::string &name, const std::string &script,
-                  const DriverExpectation &expectation = {})
-{
-    DriverCase result{name, "%T %O %A %B", script};
-    result.expectation = expectation;
-    return result;
-}
-
 /// Enough lines for a rename to be found.
 std::string lines(const std::string &first, const std::string &last = "last")
 {
     return first + "\n2\n3\n4\n5\n6\n7\n8\n9\n" + last + '\n';
-}
-
-Change moves(const std::string &from, const std::string &to)
-{
-    return [from, to](const GitRepository &repository) { repository.git({"mv", from, to}); };
-}
-
-Change sets(const std::string &name, unsigned mode)
-{
-    return [name, mode](const GitRepository &repository) { repository.setMode(name, mode); };
-}
-
-Change removes(const std::string &name)
-{
-    return [name](const GitRepository &repository) { repository.remove(name); };
-}
-
-Change links(const std::string &name, const std::string &target)
-{
-    return [name, target](const GitRepository &repository)
-    {
-        std::filesystem::remove(repository / name);
-        repository.symlink(target, name);
-    };
-}
-
-void nothing(const GitRepository &)
-{
 }
 
 DriverCase sides(const std::string &name, const Change &base, const Change &ours,
@@ -65,11 +29,21 @@ DriverCase sides(const std::string &name, const Change &base, const Change &ours
     return result;
 }
 
-/// A driver that a file of Git's configuration names.
-DriverCase configured(const std::string &name, decltype(DriverCase::configure) configure)
+using Settings = decltype(DriverCase::settings);
+
+/// A driver that these runs of `git config` define.
+DriverCase configured(const std::string &name, const Settings &settings)
 {
     DriverCase result{name};
-    result.configure = std::move(configure);
+    result.settings = settings;
+    return result;
+}
+
+/// A driver that is defined otherwise.
+DriverCase configured(const std::string &name, const decltype(DriverCase::configure) &configure)
+{
+    DriverCase result = configured(name, Settings());
+    result.configure = configure;
     return result;
 }
 
@@ -131,16 +105,16 @@ DriverCase attributed(const std::string &name, const std::string &attributes,
 std::vector<DriverCase> resultCases()
 {
     return {
-        leaves("OursAsItIs", ":"),
-        leaves("OursRemoved", "rm \"$2\"", {Kind::OnlyGitGivesUp, "ours\n", ""}),
-        leaves("OursEmpty", ": >\"$2\""),
-        leaves("OursWithoutALineFeed", "printf merged >\"$2\""),
-        leaves("FiftyMebibytes", "yes 123456789abcdef | head -c 52428800 >\"$2\""),
-        leaves("Bytes", "printf 'a\\r\\n\\000\\377\\r' >\"$2\""),
-        leaves("AnotherMode", "chmod 755 \"$2\"; echo merged >\"$2\""),
-        leaves("AnotherFileInItsPlace", "echo merged >\"$2.new\"; mv \"$2.new\" \"$2\""),
-        leaves("AChangedAncestorAndTheirs", "echo x >\"$1\"; echo y >\"$3\""),
-        leaves("NoAncestorAndTheirs", "rm \"$1\" \"$3\"; echo merged >\"$2\""),
+        runs("OursAsItIs", ":"),
+        runs("OursRemoved", "rm \"$2\"", {Kind::OnlyGitGivesUp, "ours\n", ""}),
+        runs("OursEmpty", ": >\"$2\""),
+        runs("OursWithoutALineFeed", "printf merged >\"$2\""),
+        runs("FiftyMebibytes", "yes 123456789abcdef | head -c 52428800 >\"$2\""),
+        runs("Bytes", "printf 'a\\r\\n\\000\\377\\r' >\"$2\""),
+        runs("AnotherMode", "chmod 755 \"$2\"; echo merged >\"$2\""),
+        runs("AnotherFileInItsPlace", "echo merged >\"$2.new\"; mv \"$2.new\" \"$2\""),
+        runs("AChangedAncestorAndTheirs", "echo x >\"$1\"; echo y >\"$3\""),
+        runs("NoAncestorAndTheirs", "rm \"$1\" \"$3\"; echo merged >\"$2\""),
     };
 }
 
@@ -149,40 +123,40 @@ std::vector<DriverCase> sideCases()
     const Change base = writes("file", lines("base"));
     const Change ours = writes("file", lines("ours"));
     const Change theirs = writes("file", lines("theirs"));
-    const Change movedByOurs = both(moves("file", "new"), writes("new", lines("ours")));
-    const Change movedByTheirs = both(moves("file", "new"), writes("new", lines("theirs")));
+    const Change movedByOurs = moves("file", "new") + writes("new", lines("ours"));
+    const Change movedByTheirs = moves("file", "new") + writes("new", lines("theirs"));
     return {
         sides("MovedByOurs", base, movedByOurs, theirs),
         sides("MovedByTheirs", base, ours, movedByTheirs),
         sides("MovedByOursIntoAFolder", base,
-              both(both([](const GitRepository &repository) { repository.makeFolder("sub"); },
-                        moves("file", "sub/file")),
-                   writes("sub/file", lines("ours"))),
+              makesFolder("sub") + moves("file", "sub/file") + writes("sub/file", lines("ours")),
               theirs),
-        sides("MovedApart", base, both(moves("file", "one"), writes("one", lines("ours"))),
-              both(moves("file", "two"), writes("two", lines("theirs"))),
+        sides("MovedApart", base, moves("file", "one") + writes("one", lines("ours")),
+              moves("file", "two") + writes("two", lines("theirs")),
               // git merges the content all the same, and libgit2 leaves it to the user.
               {Kind::OtherStages, "no file", "no file"}),
-        sides("ExecutableByOurs", base, both(ours, sets("file", 0755)), theirs),
-        sides("ExecutableByTheirs", base, ours, both(theirs, sets("file", 0755))),
-        sides("ExecutableByBoth", base, both(ours, sets("file", 0755)),
-              both(theirs, sets("file", 0755))),
-        sides("NoLongerExecutableByOurs", both(base, sets("file", 0755)),
-              both(ours, sets("file", 0644)), theirs),
-        sides("MovedByOursExecutableByTheirs", base, movedByOurs, both(theirs, sets("file", 0755))),
-        sides("ExecutableByOursMovedByTheirs", base, both(ours, sets("file", 0755)), movedByTheirs),
+        sides("ExecutableByOurs", base, ours + makesExecutable("file"), theirs),
+        sides("ExecutableByTheirs", base, ours, theirs + makesExecutable("file")),
+        sides("ExecutableByBoth", base, ours + makesExecutable("file"),
+              theirs + makesExecutable("file")),
+        sides(
+            "NoLongerExecutableByOurs", base + makesExecutable("file"),
+            ours + [](const GitRepository &copy) { copy.setMode("file", 0644); }, theirs),
+        sides("MovedByOursExecutableByTheirs", base, movedByOurs, theirs + makesExecutable("file")),
+        sides("ExecutableByOursMovedByTheirs", base, ours + makesExecutable("file"), movedByTheirs),
         sides("RemovedByOurs", base, removes("file"), theirs),
         sides("RemovedByTheirs", base, ours, removes("file")),
         // git gives the command an empty ancestor.
-        sides("AddedByBoth", nothing, writes("file", "ours\n"), writes("file", "theirs\n"),
+        sides("AddedByBoth", changesNothing, writes("file", "ours\n"), writes("file", "theirs\n"),
               {Kind::OnlyGitMerges, "ours\ntheirs\nfile\n", conflictMarkers}),
-        sides("AddedByBothAlike", nothing, writes("file", "same\n"), writes("file", "same\n")),
+        sides("AddedByBothAlike", changesNothing, writes("file", "same\n"),
+              writes("file", "same\n")),
         sides("ChangedByTheirsOnly", base, writes("other", "x\n"), theirs),
         sides("ChangedByOursOnly", base, ours, writes("other", "x\n")),
         sides("ChangedAlike", base, writes("file", "same\n"), writes("file", "same\n")),
         sides("ChangedInDifferentLines", base, ours, writes("file", lines("base", "theirs"))),
         // libgit2 has the targets of links merged as if they were files.
-        sides("ALinkOfBoth", links("file", "base"), links("file", "ours"), links("file", "theirs"),
+        sides("ALinkOfBoth", links("base", "file"), links("ours", "file"), links("theirs", "file"),
               {Kind::OnlyLibraryMerges, "120000 ours", "120000 oursbasetheirsfile\n"}),
         sides("BinaryOfBoth", writes("file", std::string("b\0", 2)),
               writes("file", std::string("o\0", 2)), writes("file", std::string("t\0", 2))),
@@ -190,23 +164,10 @@ std::vector<DriverCase> sideCases()
     };
 }
 
-DriverCase inAnIncludedFile()
-{
-    return configured("InAnIncludedFile",
-                      [](const GitRepository &repository, const HermeticEnvironment &environment,
-                         const std::string &command)
-                      {
-                          const auto included = environment.home() / "included";
-                          defineIn(repository, included, command);
-                          repository.git({"config", "include.path", included.string()});
-                      });
-}
-
 std::vector<DriverCase> configurationCases()
 {
     using Environment = HermeticEnvironment;
-    DriverCase none = configured(
-        "Nowhere", [](const GitRepository &, const Environment &, const std::string &) {});
+    const DriverCase none = configured("Nowhere", Settings());
     DriverCase clean = none;
     clean.name = "NowhereForAFileWithoutConflicts";
     clean.base = writes("file", lines("base"));
@@ -223,33 +184,19 @@ std::vector<DriverCase> configurationCases()
         definedIn("InTheRepositoryBeforeTheGlobalFile", {".gitconfig", ""}),
         definedIn("InTheRepositoryBeforeTheXdgFile", {".config/git/config", ""}),
         definedIn("InTheGlobalBeforeTheXdgFile", {".config/git/config", ".gitconfig"}),
-        inAnIncludedFile(),
-        configured(
-            "TwiceInOneFile",
-            [](const GitRepository &repository, const Environment &, const std::string &command)
-            {
-                repository.git({"config", "merge.tool.driver", "false"});
-                repository.git({"config", "--add", "merge.tool.driver", command});
-            }),
-        configured(
-            "UnderAnotherSpelling",
-            [](const GitRepository &repository, const Environment &, const std::string &command) {
-                repository.git({"config", "merge.Tool.driver", command});
-            }),
-        configured(
-            "WithAName",
-            [](const GitRepository &repository, const Environment &, const std::string &command)
-            {
-                repository.git({"config", "merge.tool.name", "a tool"});
-                repository.git({"config", "merge.tool.driver", command});
-            }),
-        configured(
-            "AsTheDefault",
-            [](const GitRepository &repository, const Environment &, const std::string &command)
-            {
-                repository.git({"config", "merge.default", "other"});
-                repository.git({"config", "merge.tool.driver", command});
-            }),
+        configured("InAnIncludedFile",
+                   [](const GitRepository &repository, const Environment &environment,
+                      const std::string &command)
+                   {
+                       const auto included = environment.home() / "included";
+                       defineIn(repository, included, command);
+                       repository.git({"config", "include.path", included.string()});
+                   }),
+        configured("TwiceInOneFile",
+                   {{"merge.tool.driver", "false"}, {"--add", "merge.tool.driver", "%C"}}),
+        configured("UnderAnotherSpelling", {{"merge.Tool.driver", "%C"}}),
+        configured("WithAName", {{"merge.tool.name", "a tool"}, {"merge.tool.driver", "%C"}}),
+        configured("AsTheDefault", {{"merge.default", "other"}, {"merge.tool.driver", "%C"}}),
         configured("WithoutAValue",
                    [](const GitRepository &repository, const Environment &, const std::string &)
                    {
@@ -262,26 +209,15 @@ std::vector<DriverCase> configurationCases()
 std::vector<DriverCase> attributeCases()
 {
     DriverCase byDefault = attributed("NoneAndADefault", "");
-    byDefault.configure =
-        [](const GitRepository &repository, const HermeticEnvironment &, const std::string &command)
-    {
-        repository.git({"config", "merge.default", "tool"});
-        repository.git({"config", "merge.tool.driver", command});
-    };
-    DriverCase text = attributed("TextThoughADriverHasItsName", "* merge=text\n");
-    text.configure = [](const GitRepository &repository, const HermeticEnvironment &,
-                        const std::string &command) {
-        repository.git({"config", "merge.text.driver", command});
-    };
+    byDefault.settings.push_back({"merge.default", "tool"});
     // libgit2's own drivers can't be replaced.
-    text.expectation = {Kind::OnlyGitMerges, "ours\nbase\ntheirs\n", conflictMarkers};
+    DriverCase text = attributed("TextThoughADriverHasItsName", "* merge=text\n",
+                                 {Kind::OnlyGitMerges, "ours\nbase\ntheirs\n", conflictMarkers});
+    text.settings = {{"merge.text.driver", "%C"}};
     DriverCase inRepository = attributed("InTheRepositorysOwnFile", "");
     inRepository.configure =
-        [](const GitRepository &repository, const HermeticEnvironment &, const std::string &command)
-    {
-        repository.git({"config", "merge.tool.driver", command});
-        repository.write(".git/info/attributes", "file merge=tool\n");
-    };
+        [](const GitRepository &repository, const HermeticEnvironment &, const std::string &)
+    { repository.write(".git/info/attributes", "file merge=tool\n"); };
     return {
         attributed("None", ""),
         attributed("Text", "* merge=text\n"),

@@ -24,10 +24,7 @@ class DriverContract : public GitFixture, public testing::WithParamInterface<Dri
 TEST_P(DriverContract, HoldsByTheLibraryAsByGit)
 {
     const GitRepository byGit = makeRepositoryOf(GetParam(), folder().path(), environment());
-    std::filesystem::copy(byGit.path(), folder() / "library",
-                          std::filesystem::copy_options::recursive |
-                              std::filesystem::copy_options::copy_symlinks);
-    const GitRepository byLibrary(folder() / "library");
+    const GitRepository byLibrary = byGit.copyTo(folder() / "library");
     const DriverOutcome git = mergeByGit(byGit);
     const DriverOutcome library = mergeByLibrary(byLibrary);
     expectOutcomes(GetParam(), git, library);

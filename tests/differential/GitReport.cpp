@@ -6,7 +6,8 @@
 #include <set>
 #include <sstream>
 #include <stdexcept>
-#include <utility>
+
+#include "support/strings.hpp"
 
 namespace vclink::test
 {
@@ -14,17 +15,6 @@ namespace
 {
 
 const std::string emptyBlob = "e69de29bb2d1d6434b8b29ae775ad8c2e48c5391";
-
-std::vector<std::string> splitAtNul(const std::string &text)
-{
-    std::vector<std::string> records;
-    std::size_t begin = 0;
-    for (std::size_t end; (end = text.find('\0', begin)) != std::string::npos; begin = end + 1)
-    {
-        records.push_back(text.substr(begin, end - begin));
-    }
-    return records;
-}
 
 /// "1 XY sub mH mI mW hH hI path"
 void readChange(std::istringstream fields, GitReport &report)
@@ -94,12 +84,9 @@ void removeFalseHeads(const GitRepository &repository, GitReport &report)
     {
         return;
     }
-    std::set<std::string> inHead;
-    for (auto &path :
-         splitAtNul(repository.tryGit({"ls-tree", "-r", "-z", "--name-only", "HEAD"}).output))
-    {
-        inHead.insert(std::move(path));
-    }
+    const auto listed =
+        split(repository.tryGit({"ls-tree", "-r", "-z", "--name-only", "HEAD"}).output, '\0');
+    const std::set<std::string> inHead(listed.begin(), listed.end());
     for (auto &[path, file] : report)
     {
         if (isSuspect(file) && inHead.count(path) == 0)
@@ -132,11 +119,11 @@ GitReport readGitReport(const GitRepository &repository, const std::string &stat
                         const std::string &index)
 {
     GitReport report;
-    for (const auto &record : splitAtNul(status))
+    for (const auto &record : split(status, '\0'))
     {
         readRecord(record, report);
     }
-    for (const auto &record : splitAtNul(index))
+    for (const auto &record : split(index, '\0'))
     {
         readIndexEntry(record, report);
     }

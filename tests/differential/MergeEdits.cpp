@@ -6,6 +6,7 @@
 #include <utility>
 
 #include "historyText.hpp"
+#include "listedNames.hpp"
 
 namespace vclink::test
 {
@@ -33,16 +34,11 @@ bool isLongText(const TreeFile &file)
            std::count(file.content.begin(), file.content.end(), '\n') >= 12;
 }
 
-bool isIn(const std::string &path, const std::string &folder)
-{
-    return path.compare(0, folder.size() + 1, folder + '/') == 0;
-}
-
 void put(Tree &tree, const std::string &path, TreeFile file)
 {
     for (auto entry = tree.begin(); entry != tree.end();)
     {
-        const bool isInTheWay = isIn(entry->first, path) || isIn(path, entry->first);
+        const bool isInTheWay = isBelow(entry->first, path) || isBelow(path, entry->first);
         entry = isInTheWay ? tree.erase(entry) : std::next(entry);
     }
     tree[path] = std::move(file);
@@ -58,7 +54,7 @@ Tree MergeEdits::makeTree()
     }
     for (int count = 0; count < 3; ++count)
     {
-        const std::string binary = makeBinary(random_);
+        const std::string binary = makeBinary(random);
         put(tree, makePath() + ".bin", {plainMode, binary});
         put(tree, makePath() + ".link", {linkMode, "target" + std::to_string(count)});
     }
@@ -69,199 +65,41 @@ Tree MergeEdits::makeTree()
 
 const std::vector<MergeEdits::Kind> &MergeEdits::kinds()
 {
-    static const std::vector<Kind> all{
-        {"texts edited apart", &MergeEdits::editApart},
-        {"one line edited twice", &MergeEdits::editSameLine},
-        {"neighbouring lines edited", &MergeEdits::editNeighbours},
-        {"lines inserted at one place", &MergeEdits::insertAtOnePlace},
-        {"a text edited alike", &MergeEdits::editAlike},
-        {"lines moved against edited", &MergeEdits::moveLines},
-        {"a file deleted against edited", &MergeEdits::deleteAgainstEdit},
-        {"a file added alike", &MergeEdits::addAlike},
-        {"a file added differently", &MergeEdits::addDifferently},
-        {"a file added similarly", &MergeEdits::addSimilarly},
-        {"a file renamed against edited", &MergeEdits::renameAgainstEdit},
-        {"a file renamed and edited against edited", &MergeEdits::renameAndEditBoth},
-        {"a file renamed alike", &MergeEdits::renameAlike},
-        {"a file renamed twice", &MergeEdits::renameApart},
-        {"a file renamed against deleted", &MergeEdits::renameAgainstDelete},
-        {"a file renamed onto an added one", &MergeEdits::renameOntoAdded},
-        {"two files renamed onto one name", &MergeEdits::renameTwoOntoOne},
-        {"two names swapped", &MergeEdits::swapNames},
-        {"a folder moved against a file added to it", &MergeEdits::moveFolder},
-        {"a mode changed against edited", &MergeEdits::setModeAgainstEdit},
-        {"a mode changed in a conflict", &MergeEdits::setModeInConflict},
-        {"a mode changed against deleted", &MergeEdits::setModeAgainstDelete},
-        {"a link changed twice", &MergeEdits::retargetLinks},
-        {"a link for a file against edited", &MergeEdits::replaceByLinkAgainstEdit},
-        {"a link added against a file", &MergeEdits::addLinkAgainstFile},
-        {"a binary file edited once", &MergeEdits::editBinaryOnce},
-        {"a binary file edited twice", &MergeEdits::editBinaryTwice},
-        {"a folder for a file against edited", &MergeEdits::replaceByFolderAgainstEdit},
-        {"a folder added against a file", &MergeEdits::addFolderAgainstFile},
-        {"a file renamed onto a folder", &MergeEdits::renameOntoFolder},
-    };
+    static const std::vector<Kind> all = []
+    {
+        std::vector<Kind> kinds = contentEdits;
+        for (const auto *more : {&renames, &typeChanges})
+            kinds.insert(kinds.end(), more->begin(), more->end());
+        return kinds;
+    }();
     return all;
 }
 
-std::size_t MergeEdits::kindCount()
+bool MergeEdits::edit(const Kind &kind, Tree &ours, Tree &theirs)
 {
-    return kinds().size();
-}
-
-std::string MergeEdits::nameOfKind(std::size_t kind)
-{
-    return kinds().at(kind).name;
-}
-
-bool MergeEdits::edit(std::size_t kind, Tree &ours, Tree &theirs)
-{
-    const Edit method = kinds().at(kind).edit;
-    return random_.chance(50) ? (this->*method)(ours, theirs) : (this->*method)(theirs, ours);
+    return random.chance(50) ? kind.edit(*this, ours, theirs) : kind.edit(*this, theirs, ours);
 }
 
 void MergeEdits::editSomething(Tree &tree)
 {
     const auto path = pickText(tree, tree);
-    if (tree.size() < fewestFiles || !path || (tree.size() < mostFiles && random_.chance(15)))
+    if (tree.size() < fewestFiles || !path || (tree.size() < mostFiles && random.chance(15)))
     {
         const TreeFile file = makeTextFile();
         put(tree, makePath(), file);
     }
-    else if (tree.size() > mostFiles || random_.chance(10))
+    else if (tree.size() > mostFiles || random.chance(10))
     {
         tree.erase(*path);
     }
-    else if (random_.chance(10))
+    else if (random.chance(10))
     {
-        rename(tree, *path, makePath());
+        renameAnyhow(tree, *path);
     }
     else
     {
-        editTextOf(tree, *path, random_.below(3));
+        editTextOf(tree, *path, random.below(3));
     }
-}
-
-bool MergeEdits::editApart(Tree &one, Tree &other)
-{
-    const auto path = pickText(one, other);
-    if (path)
-    {
-        editTextOf(one, *path, 0);
-        editTextOf(other, *path, 2);
-    }
-    return path.has_value();
-}
-
-bool MergeEdits::editSameLine(Tree &one, Tree &other)
-{
-    const auto path = pickText(one, other);
-    if (path)
-    {
-        const auto line = random_.below(12);
-        for (auto *tree : {&one, &other})
-        {
-            auto &content = (*tree)[*path].content;
-            content = replaceLine(content, line, makeUniqueLine(random_));
-        }
-    }
-    return path.has_value();
-}
-
-bool MergeEdits::editNeighbours(Tree &one, Tree &other)
-{
-    const auto path = pickText(one, other);
-    if (path)
-    {
-        const auto line = random_.below(8);
-        auto &content = one[*path].content;
-        auto &otherContent = other[*path].content;
-        content = replaceLine(content, line, makeUniqueLine(random_));
-        const std::string otherText = makeUniqueLine(random_);
-        const auto otherLine = line + 1 + random_.below(3);
-        otherContent = replaceLine(otherContent, otherLine, otherText);
-    }
-    return path.has_value();
-}
-
-bool MergeEdits::insertAtOnePlace(Tree &one, Tree &other)
-{
-    const auto path = pickText(one, other);
-    if (path)
-    {
-        const auto line = random_.below(12);
-        for (auto *tree : {&one, &other})
-        {
-            auto &content = (*tree)[*path].content;
-            content = insertLine(content, line, makeUniqueLine(random_));
-        }
-    }
-    return path.has_value();
-}
-
-bool MergeEdits::editAlike(Tree &one, Tree &other)
-{
-    const auto path = pickText(one, other);
-    if (path)
-    {
-        editTextOf(one, *path, 1);
-        other[*path] = one[*path];
-        editTextOf(other, *path, 1);
-    }
-    return path.has_value();
-}
-
-bool MergeEdits::moveLines(Tree &one, Tree &other)
-{
-    const auto path = pickText(one, other);
-    if (path)
-    {
-        one[*path].content = moveBlock(random_, one[*path].content);
-        editTextOf(other, *path, random_.below(2));
-    }
-    return path.has_value();
-}
-
-bool MergeEdits::deleteAgainstEdit(Tree &one, Tree &other)
-{
-    const auto path = pickText(one, other);
-    if (path)
-    {
-        one.erase(*path);
-        editTextOf(other, *path, 1);
-    }
-    return path.has_value();
-}
-
-bool MergeEdits::addAlike(Tree &one, Tree &other)
-{
-    const auto path = makePath();
-    const auto file = makeTextFile();
-    put(one, path, file);
-    put(other, path, file);
-    return true;
-}
-
-bool MergeEdits::addDifferently(Tree &one, Tree &other)
-{
-    const auto path = makePath();
-    put(one, path, makeTextFile());
-    put(other, path, makeTextFile());
-    return true;
-}
-
-bool MergeEdits::addSimilarly(Tree &one, Tree &other)
-{
-    const auto path = makePath();
-    put(one, path, makeTextFile());
-    put(other, path, one[path]);
-    editTextOf(one, path, 0);
-    editTextOf(other, path, random_.below(3));
-    if (random_.chance(30))
-    {
-        toggleMode(one[path]);
-    }
-    return true;
 }
 
 std::optional<std::string> MergeEdits::pickCommon(const Tree &one, const Tree &other,
@@ -280,7 +118,7 @@ std::optional<std::string> MergeEdits::pickCommon(const Tree &one, const Tree &o
     {
         return std::nullopt;
     }
-    return random_.pick(paths);
+    return random.pick(paths);
 }
 
 std::optional<std::string> MergeEdits::pickText(const Tree &one, const Tree &other)
@@ -291,7 +129,12 @@ std::optional<std::string> MergeEdits::pickText(const Tree &one, const Tree &oth
 std::string MergeEdits::makePath()
 {
     static const std::vector<std::string> folders{"", "src/", "src/core/", "doc/", "tools/"};
-    return random_.pick(folders) + "file" + std::to_string(++names_);
+    return random.pick(folders) + "file" + makeNumber();
+}
+
+std::string MergeEdits::makeNumber()
+{
+    return std::to_string(++names_);
 }
 
 void MergeEdits::rename(Tree &tree, const std::string &from, const std::string &to)
@@ -301,20 +144,38 @@ void MergeEdits::rename(Tree &tree, const std::string &from, const std::string &
     put(tree, to, std::move(file));
 }
 
+std::string MergeEdits::renameAnyhow(Tree &tree, const std::string &from)
+{
+    const std::string to = makePath();
+    rename(tree, from, to);
+    return to;
+}
+
 void MergeEdits::editTextOf(Tree &tree, const std::string &path, std::size_t third)
 {
     auto &content = tree[path].content;
-    content = editText(random_, content, thirdOf(content, third));
-}
-
-void MergeEdits::toggleMode(TreeFile &file)
-{
-    file.mode = file.mode == plainMode ? executableMode : plainMode;
+    content = editText(random, content, thirdOf(content, third));
 }
 
 TreeFile MergeEdits::makeTextFile()
 {
-    return {random_.chance(10) ? executableMode : plainMode, makeText(random_)};
+    return {random.chance(10) ? executableMode : plainMode, makeText(random)};
+}
+
+MergeEdits::Kind ofText(const std::string &name, const TextEdit &edit)
+{
+    return {name, [edit](MergeEdits &edits, Tree &one, Tree &other)
+            {
+                const auto path = edits.pickText(one, other);
+                if (path)
+                    edit(edits, one, other, *path);
+                return path.has_value();
+            }};
+}
+
+void toggleMode(TreeFile &file)
+{
+    file.mode = file.mode == plainMode ? executableMode : plainMode;
 }
 
 } // namespace vclink::test

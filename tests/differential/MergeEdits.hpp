@@ -36,8 +36,6 @@ inline const std::string linkMode = "120000";
 /// The files of a commit, by path.
 using Tree = std::map<std::string, TreeFile>;
 
-/// Whether a name is that of something in a folder.
-bool isIn(const std::string &path, const std::string &folder);
 /// Sets a file, and takes away those that can't be beside it: below it, or in the place of a folder
 /// that it is in.
 void put(Tree &tree, const std::string &path, TreeFile file);
@@ -47,60 +45,28 @@ void put(Tree &tree, const std::string &path, TreeFile file);
 class MergeEdits
 {
   public:
-    explicit MergeEdits(Random &random) : random_(random)
+    /// A way to change both sides.
+    struct Kind
+    {
+        std::string name;
+        /// @return false when the trees don't offer what it takes; nothing is changed then
+        std::function<bool(MergeEdits &edits, Tree &one, Tree &other)> edit;
+    };
+    static const std::vector<Kind> &kinds();
+
+    explicit MergeEdits(Random &numbers) : random(numbers)
     {
     }
 
     /// The first tree.
     Tree makeTree();
-
-    static std::size_t kindCount();
-    static std::string nameOfKind(std::size_t kind);
-    /// Changes both sides in one of the kindCount() ways.
+    /// Changes both sides in one of the ways.
     /// @return false when the trees don't offer what it takes; nothing is changed then
-    bool edit(std::size_t kind, Tree &ours, Tree &theirs);
+    bool edit(const Kind &kind, Tree &ours, Tree &theirs);
     /// Changes one side somewhere.
     void editSomething(Tree &tree);
 
-  private:
-    using Edit = bool (MergeEdits::*)(Tree &one, Tree &other);
-    struct Kind
-    {
-        const char *name;
-        Edit edit;
-    };
-    static const std::vector<Kind> &kinds();
-
-    bool editApart(Tree &one, Tree &other);
-    bool editSameLine(Tree &one, Tree &other);
-    bool editNeighbours(Tree &one, Tree &other);
-    bool insertAtOnePlace(Tree &one, Tree &other);
-    bool editAlike(Tree &one, Tree &other);
-    bool moveLines(Tree &one, Tree &other);
-    bool deleteAgainstEdit(Tree &one, Tree &other);
-    bool addAlike(Tree &one, Tree &other);
-    bool addDifferently(Tree &one, Tree &other);
-    bool addSimilarly(Tree &one, Tree &other);
-    bool renameAgainstEdit(Tree &one, Tree &other);
-    bool renameAndEditBoth(Tree &one, Tree &other);
-    bool renameAlike(Tree &one, Tree &other);
-    bool renameApart(Tree &one, Tree &other);
-    bool renameAgainstDelete(Tree &one, Tree &other);
-    bool renameOntoAdded(Tree &one, Tree &other);
-    bool renameTwoOntoOne(Tree &one, Tree &other);
-    bool swapNames(Tree &one, Tree &other);
-    bool moveFolder(Tree &one, Tree &other);
-    bool setModeAgainstEdit(Tree &one, Tree &other);
-    bool setModeInConflict(Tree &one, Tree &other);
-    bool setModeAgainstDelete(Tree &one, Tree &other);
-    bool retargetLinks(Tree &one, Tree &other);
-    bool replaceByLinkAgainstEdit(Tree &one, Tree &other);
-    bool addLinkAgainstFile(Tree &one, Tree &other);
-    bool editBinaryOnce(Tree &one, Tree &other);
-    bool editBinaryTwice(Tree &one, Tree &other);
-    bool replaceByFolderAgainstEdit(Tree &one, Tree &other);
-    bool addFolderAgainstFile(Tree &one, Tree &other);
-    bool renameOntoFolder(Tree &one, Tree &other);
+    // What the kinds are made of.
 
     using Selection = std::function<bool(const TreeFile &file)>;
     /// A path of a file that both trees have and for which `isWanted` returns true in both.
@@ -109,13 +75,30 @@ class MergeEdits
     std::optional<std::string> pickText(const Tree &one, const Tree &other);
     /// A path that no tree has had.
     std::string makePath();
-    void rename(Tree &tree, const std::string &from, const std::string &to);
+    /// A number that no name has had.
+    std::string makeNumber();
+    static void rename(Tree &tree, const std::string &from, const std::string &to);
+    /// As rename(), to a new path.
+    /// @return the path
+    std::string renameAnyhow(Tree &tree, const std::string &from);
     void editTextOf(Tree &tree, const std::string &path, std::size_t third);
     TreeFile makeTextFile();
-    static void toggleMode(TreeFile &file);
 
-    Random &random_;
+    Random &random;
+
+  private:
     int names_ = 0;
 };
+
+/// Changes both sides of a text that they have in common.
+using TextEdit =
+    std::function<void(MergeEdits &edits, Tree &one, Tree &other, const std::string &path)>;
+MergeEdits::Kind ofText(const std::string &name, const TextEdit &edit);
+void toggleMode(TreeFile &file);
+
+/// The kinds, by what they are about.
+extern const std::vector<MergeEdits::Kind> contentEdits;
+extern const std::vector<MergeEdits::Kind> renames;
+extern const std::vector<MergeEdits::Kind> typeChanges;
 
 } // namespace vclink::test

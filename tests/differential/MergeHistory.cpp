@@ -47,7 +47,7 @@ MergeHistory::MergeHistory(std::uint64_t seed, std::size_t merges) : random_(see
     tips_.assign(tipCount, commit("first", {}, edits_.makeTree()));
     for (std::size_t kind = 0; merges_ < merges; ++kind)
     {
-        addMerges(kind % MergeEdits::kindCount());
+        addMerges(MergeEdits::kinds()[kind % MergeEdits::kinds().size()]);
     }
     for (std::size_t tip = 0; tip < tipCount; ++tip)
     {
@@ -59,13 +59,7 @@ MergeHistory::MergeHistory(std::uint64_t seed, std::size_t merges) : random_(see
 
 void MergeHistory::importInto(const GitRepository &repository) const
 {
-    const Command command =
-        repository.command({"fast-import", "--quiet", "--done", "--force"}).input(stream_);
-    const CommandResult result = command.run();
-    if (!result.succeeded())
-    {
-        throw std::runtime_error(command.text() + ": " + result.errors);
-    }
+    repository.command({"fast-import", "--quiet", "--done", "--force"}).input(stream_).runOrThrow();
     repository.git({"symbolic-ref", "HEAD", "refs/heads/tip0"});
     repository.git({"update-ref", "-d", "refs/heads/written"});
 }
@@ -116,7 +110,7 @@ void MergeHistory::writeTree(const Tree &before, const Tree &after)
     stream_ += '\n';
 }
 
-void MergeHistory::addMerges(std::size_t kind)
+void MergeHistory::addMerges(const MergeEdits::Kind &kind)
 {
     const auto tip = random_.below(tipCount);
     const auto otherTip = (tip + 1 + random_.below(tipCount - 1)) % tipCount;
@@ -133,7 +127,7 @@ void MergeHistory::addMerges(std::size_t kind)
     }
     Tree ourTree = commits_[ours].tree;
     Tree theirTree = commits_[theirs].tree;
-    std::string subject = MergeEdits::nameOfKind(kind);
+    std::string subject = kind.name;
     if (!edits_.edit(kind, ourTree, theirTree))
     {
         subject = "nothing shared";

@@ -44,7 +44,7 @@ class MergeHistory
 
     Number commit(const std::string &subject, const std::vector<Number> &parents, Tree tree);
     void writeTree(const Tree &before, const Tree &after);
-    void addMerges(std::size_t kind);
+    void addMerges(const MergeEdits::Kind &kind);
     /// As a person would resolve it; not what any merge would give.
     Number merge(const std::string &subject, Number ours, Number theirs);
     Number findMergeBase(Number left, Number right) const;

@@ -1,163 +1,108 @@
 // SPDX-License-Identifier: MIT
+#include <filesystem>
 #include <utility>
-#include <vector>
 
 #include "MergeEdits.hpp"
+#include "listedNames.hpp"
 
-/// The changes of MergeEdits that give files other names.
 namespace vclink::test
 {
 namespace
 {
 
-std::string folderOfPath(const std::string &path)
+std::optional<std::pair<std::string, std::string>> pickTwo(MergeEdits &edits, const Tree &one,
+                                                           const Tree &other)
 {
-    const auto slash = path.rfind('/');
-    return slash == std::string::npos ? std::string() : path.substr(0, slash);
+    const auto first = edits.pickText(one, other);
+    const auto second = edits.pickText(one, other);
+    if (!first || first == second)
+        return std::nullopt;
+    return std::make_pair(*first, *second);
+}
+
+bool moveFolder(MergeEdits &edits, Tree &one, Tree &other)
+{
+    const auto path = edits.pickText(one, other);
+    const auto folder = path ? std::filesystem::path(*path).parent_path().string() : std::string();
+    if (folder.empty())
+        return false;
+    const auto number = edits.makeNumber();
+    std::vector<std::string> paths;
+    for (const auto &[name, file] : one)
+    {
+        if (isBelow(name, folder))
+            paths.push_back(name);
+    }
+    for (const auto &name : paths)
+        MergeEdits::rename(one, name, "moved" + number + name.substr(folder.size()));
+    put(other, folder + "/added" + number, edits.makeTextFile());
+    edits.editTextOf(other, *path, 1);
+    return true;
 }
 
 } // namespace
 
-bool MergeEdits::renameAgainstEdit(Tree &one, Tree &other)
-{
-    const auto path = pickText(one, other);
-    if (path)
-    {
-        rename(one, *path, makePath());
-        editTextOf(other, *path, random_.below(3));
-    }
-    return path.has_value();
-}
-
-bool MergeEdits::renameAndEditBoth(Tree &one, Tree &other)
-{
-    const auto path = pickText(one, other);
-    if (path)
-    {
-        const auto renamed = makePath();
-        rename(one, *path, renamed);
-        editTextOf(one, renamed, 0);
-        editTextOf(other, *path, random_.chance(50) ? 0 : 2);
-    }
-    return path.has_value();
-}
-
-bool MergeEdits::renameAlike(Tree &one, Tree &other)
-{
-    const auto path = pickText(one, other);
-    if (path)
-    {
-        const auto renamed = makePath();
-        rename(one, *path, renamed);
-        rename(other, *path, renamed);
-        editTextOf(one, renamed, 0);
-        editTextOf(other, renamed, random_.chance(30) ? 0 : 2);
-    }
-    return path.has_value();
-}
-
-bool MergeEdits::renameApart(Tree &one, Tree &other)
-{
-    const auto path = pickText(one, other);
-    if (path)
-    {
-        const auto renamed = makePath();
-        rename(one, *path, renamed);
-        rename(other, *path, makePath());
-        if (random_.chance(50))
-        {
-            editTextOf(one, renamed, 0);
-        }
-    }
-    return path.has_value();
-}
-
-bool MergeEdits::renameAgainstDelete(Tree &one, Tree &other)
-{
-    const auto path = pickText(one, other);
-    if (path)
-    {
-        rename(one, *path, makePath());
-        other.erase(*path);
-    }
-    return path.has_value();
-}
-
-bool MergeEdits::renameOntoAdded(Tree &one, Tree &other)
-{
-    const auto path = pickText(one, other);
-    if (path)
-    {
-        const auto renamed = makePath();
-        rename(one, *path, renamed);
-        put(other, renamed, makeTextFile());
-    }
-    return path.has_value();
-}
-
-bool MergeEdits::renameTwoOntoOne(Tree &one, Tree &other)
-{
-    const auto first = pickText(one, other);
-    const auto second = pickText(one, other);
-    if (!first || first == second)
-    {
-        return false;
-    }
-    const auto renamed = makePath();
-    rename(one, *first, renamed);
-    rename(other, *second, renamed);
-    return true;
-}
-
-bool MergeEdits::swapNames(Tree &one, Tree &other)
-{
-    const auto first = pickText(one, other);
-    const auto second = pickText(one, other);
-    if (!first || first == second)
-    {
-        return false;
-    }
-    std::swap(one[*first], one[*second]);
-    editTextOf(other, *first, random_.below(3));
-    return true;
-}
-
-bool MergeEdits::moveFolder(Tree &one, Tree &other)
-{
-    const auto path = pickText(one, other);
-    const auto folder = path ? folderOfPath(*path) : std::string();
-    if (folder.empty())
-    {
-        return false;
-    }
-    const auto renamed = "moved" + std::to_string(++names_);
-    std::vector<std::string> paths;
-    for (const auto &[name, file] : one)
-    {
-        if (isIn(name, folder))
-        {
-            paths.push_back(name);
-        }
-    }
-    for (const auto &name : paths)
-    {
-        rename(one, name, renamed + name.substr(folder.size()));
-    }
-    put(other, folder + "/added" + std::to_string(names_), makeTextFile());
-    editTextOf(other, *path, 1);
-    return true;
-}
-
-bool MergeEdits::renameOntoFolder(Tree &one, Tree &other)
-{
-    const auto path = pickText(one, other);
-    if (path)
-    {
-        const auto renamed = makePath();
-        rename(one, *path, renamed);
-        put(other, renamed + "/inner", makeTextFile());
-    }
-    return path.has_value();
-}
+const std::vector<MergeEdits::Kind> renames{
+    ofText("a file renamed against edited",
+           [](MergeEdits &edits, Tree &one, Tree &other, const std::string &path)
+           {
+               edits.renameAnyhow(one, path);
+               edits.editTextOf(other, path, edits.random.below(3));
+           }),
+    ofText("a file renamed and edited against edited",
+           [](MergeEdits &edits, Tree &one, Tree &other, const std::string &path)
+           {
+               edits.editTextOf(one, edits.renameAnyhow(one, path), 0);
+               edits.editTextOf(other, path, edits.random.chance(50) ? 0 : 2);
+           }),
+    ofText("a file renamed alike",
+           [](MergeEdits &edits, Tree &one, Tree &other, const std::string &path)
+           {
+               const auto renamed = edits.renameAnyhow(one, path);
+               MergeEdits::rename(other, path, renamed);
+               edits.editTextOf(one, renamed, 0);
+               edits.editTextOf(other, renamed, edits.random.chance(30) ? 0 : 2);
+           }),
+    ofText("a file renamed twice",
+           [](MergeEdits &edits, Tree &one, Tree &other, const std::string &path)
+           {
+               const auto renamed = edits.renameAnyhow(one, path);
+               edits.renameAnyhow(other, path);
+               if (edits.random.chance(50))
+                   edits.editTextOf(one, renamed, 0);
+           }),
+    ofText("a file renamed against deleted",
+           [](MergeEdits &edits, Tree &one, Tree &other, const std::string &path)
+           {
+               edits.renameAnyhow(one, path);
+               other.erase(path);
+           }),
+    ofText("a file renamed onto an added one",
+           [](MergeEdits &edits, Tree &one, Tree &other, const std::string &path)
+           {
+               const auto renamed = edits.renameAnyhow(one, path);
+               put(other, renamed, edits.makeTextFile());
+           }),
+    {"two files renamed onto one name",
+     [](MergeEdits &edits, Tree &one, Tree &other)
+     {
+         const auto paths = pickTwo(edits, one, other);
+         if (paths)
+             MergeEdits::rename(other, paths->second, edits.renameAnyhow(one, paths->first));
+         return paths.has_value();
+     }},
+    {"two names swapped",
+     [](MergeEdits &edits, Tree &one, Tree &other)
+     {
+         const auto paths = pickTwo(edits, one, other);
+         if (paths)
+         {
+             std::swap(one[paths->first], one[paths->second]);
+             edits.editTextOf(other, paths->first, edits.random.below(3));
+         }
+         return paths.has_value();
+     }},
+    {"a folder moved against a file added to it", &moveFolder},
+};
 
 } // namespace vclink::test

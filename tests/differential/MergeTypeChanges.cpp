@@ -2,124 +2,106 @@
 #include "MergeEdits.hpp"
 #include "historyText.hpp"
 
-/// The changes of MergeEdits that are about modes, links, binary files and folders.
 namespace vclink::test
 {
-
-bool MergeEdits::setModeAgainstEdit(Tree &one, Tree &other)
+namespace
 {
-    const auto path = pickText(one, other);
-    if (path)
-    {
-        toggleMode(one[*path]);
-        editTextOf(other, *path, 1);
-    }
-    return path.has_value();
-}
 
-bool MergeEdits::setModeInConflict(Tree &one, Tree &other)
+bool addLinkAgainstFile(MergeEdits &edits, Tree &one, Tree &other)
 {
-    const auto path = pickText(one, other);
-    if (path)
-    {
-        toggleMode(one[*path]);
-        editTextOf(one, *path, 1);
-        editTextOf(other, *path, 1);
-    }
-    return path.has_value();
-}
-
-bool MergeEdits::setModeAgainstDelete(Tree &one, Tree &other)
-{
-    const auto path = pickText(one, other);
-    if (path)
-    {
-        toggleMode(one[*path]);
-        other.erase(*path);
-    }
-    return path.has_value();
-}
-
-bool MergeEdits::retargetLinks(Tree &one, Tree &other)
-{
-    const auto path = pickCommon(one, other, isLink);
-    if (!path)
-    {
-        return addLinkAgainstFile(one, other);
-    }
-    one[*path].content = makePath();
-    if (random_.chance(70))
-    {
-        other[*path].content = makePath();
-    }
+    const auto path = edits.makePath() + ".link";
+    put(one, path, {linkMode, edits.makePath()});
+    put(other, path,
+        edits.random.chance(30) ? TreeFile{linkMode, edits.makePath()} : edits.makeTextFile());
     return true;
 }
 
-bool MergeEdits::replaceByLinkAgainstEdit(Tree &one, Tree &other)
-{
-    const auto path = pickText(one, other);
-    if (path)
-    {
-        one[*path] = {linkMode, makePath()};
-        editTextOf(other, *path, 1);
-    }
-    return path.has_value();
-}
+} // namespace
 
-bool MergeEdits::addLinkAgainstFile(Tree &one, Tree &other)
-{
-    const auto path = makePath() + ".link";
-    put(one, path, {linkMode, makePath()});
-    put(other, path, random_.chance(30) ? TreeFile{linkMode, makePath()} : makeTextFile());
-    return true;
-}
-
-bool MergeEdits::editBinaryOnce(Tree &one, Tree &other)
-{
-    const auto path = pickCommon(one, other, isBinary);
-    if (!path)
-    {
-        const std::string binary = makeBinary(random_);
-        put(one, makePath() + ".bin", {plainMode, binary});
-        return true;
-    }
-    one[*path].content = editBinary(random_, one[*path].content);
-    if (random_.chance(40))
-    {
-        rename(other, *path, makePath() + ".bin");
-    }
-    return true;
-}
-
-bool MergeEdits::editBinaryTwice(Tree &one, Tree &other)
-{
-    const auto path = pickCommon(one, other, isBinary);
-    const auto name = path ? *path : makePath() + ".bin";
-    for (auto *tree : {&one, &other})
-    {
-        put(*tree, name,
-            {plainMode, path ? editBinary(random_, (*tree)[name].content) : makeBinary(random_)});
-    }
-    return true;
-}
-
-bool MergeEdits::replaceByFolderAgainstEdit(Tree &one, Tree &other)
-{
-    const auto path = pickText(one, other);
-    if (path)
-    {
-        put(one, *path + "/inner", makeTextFile());
-        editTextOf(other, *path, 1);
-    }
-    return path.has_value();
-}
-
-bool MergeEdits::addFolderAgainstFile(Tree &one, Tree &other)
-{
-    const auto path = makePath();
-    put(one, path + "/inner", makeTextFile());
-    put(other, path, makeTextFile());
-    return true;
-}
+const std::vector<MergeEdits::Kind> typeChanges{
+    ofText("a mode changed against edited",
+           [](MergeEdits &edits, Tree &one, Tree &other, const std::string &path)
+           {
+               toggleMode(one[path]);
+               edits.editTextOf(other, path, 1);
+           }),
+    ofText("a mode changed in a conflict",
+           [](MergeEdits &edits, Tree &one, Tree &other, const std::string &path)
+           {
+               toggleMode(one[path]);
+               edits.editTextOf(one, path, 1);
+               edits.editTextOf(other, path, 1);
+           }),
+    ofText("a mode changed against deleted",
+           [](MergeEdits &, Tree &one, Tree &other, const std::string &path)
+           {
+               toggleMode(one[path]);
+               other.erase(path);
+           }),
+    {"a link changed twice",
+     [](MergeEdits &edits, Tree &one, Tree &other)
+     {
+         const auto path = edits.pickCommon(one, other, isLink);
+         if (!path)
+             return addLinkAgainstFile(edits, one, other);
+         one[*path].content = edits.makePath();
+         if (edits.random.chance(70))
+             other[*path].content = edits.makePath();
+         return true;
+     }},
+    ofText("a link for a file against edited",
+           [](MergeEdits &edits, Tree &one, Tree &other, const std::string &path)
+           {
+               one[path] = {linkMode, edits.makePath()};
+               edits.editTextOf(other, path, 1);
+           }),
+    {"a link added against a file", &addLinkAgainstFile},
+    {"a binary file edited once",
+     [](MergeEdits &edits, Tree &one, Tree &other)
+     {
+         const auto path = edits.pickCommon(one, other, isBinary);
+         if (!path)
+         {
+             const std::string binary = makeBinary(edits.random);
+             put(one, edits.makePath() + ".bin", {plainMode, binary});
+             return true;
+         }
+         one[*path].content = editBinary(edits.random, one[*path].content);
+         if (edits.random.chance(40))
+             MergeEdits::rename(other, *path, edits.makePath() + ".bin");
+         return true;
+     }},
+    {"a binary file edited twice",
+     [](MergeEdits &edits, Tree &one, Tree &other)
+     {
+         const auto path = edits.pickCommon(one, other, isBinary);
+         const auto name = path ? *path : edits.makePath() + ".bin";
+         for (auto *tree : {&one, &other})
+             put(*tree, name,
+                 {plainMode, path ? editBinary(edits.random, (*tree)[name].content)
+                                  : makeBinary(edits.random)});
+         return true;
+     }},
+    ofText("a folder for a file against edited",
+           [](MergeEdits &edits, Tree &one, Tree &other, const std::string &path)
+           {
+               put(one, path + "/inner", edits.makeTextFile());
+               edits.editTextOf(other, path, 1);
+           }),
+    {"a folder added against a file",
+     [](MergeEdits &edits, Tree &one, Tree &other)
+     {
+         const auto path = edits.makePath();
+         put(one, path + "/inner", edits.makeTextFile());
+         put(other, path, edits.makeTextFile());
+         return true;
+     }},
+    ofText("a file renamed onto a folder",
+           [](MergeEdits &edits, Tree &one, Tree &other, const std::string &path)
+           {
+               const auto renamed = edits.renameAnyhow(one, path);
+               put(other, renamed + "/inner", edits.makeTextFile());
+           }),
+};
 
 } // namespace vclink::test

@@ -3,6 +3,7 @@
 
 #include "RandomContent.hpp"
 #include "RandomWorkingCopy.hpp"
+#include "listedNames.hpp"
 
 namespace vclink::test
 {
@@ -10,11 +11,6 @@ namespace
 {
 
 const std::string noId(40, '0');
-
-bool startsWith(const std::string &text, const std::string &beginning)
-{
-    return text.compare(0, beginning.size(), beginning) == 0;
-}
 
 } // namespace
 
@@ -141,12 +137,12 @@ void RandomWorkingCopy::stageFileInsteadOfFolder()
     }
     maker_.remove(folder);
     maker_.write(folder, makeContent(random_));
-    const auto isBelow = [&folder](const auto &side)
-    { return startsWith(side.path, folder + '/'); };
-    sides_.erase(std::remove_if(sides_.begin(), sides_.end(), isBelow), sides_.end());
+    sides_.erase(std::remove_if(sides_.begin(), sides_.end(),
+                                [&folder](const auto &side) { return isBelow(side.path, folder); }),
+                 sides_.end());
     for (const auto &path : tracked_)
     {
-        if (startsWith(path, folder + '/'))
+        if (isBelow(path, folder))
         {
             toStage_.push_back(path);
         }

@@ -1,13 +1,14 @@
 // SPDX-License-Identifier: MIT
 #include "RefreshHazards.hpp"
 
+#include <algorithm>
 #include <chrono>
 #include <filesystem>
-#include <sstream>
 
 #include "RandomContent.hpp"
 #include "quoting.hpp"
 #include "support/indexChecksum.hpp"
+#include "support/strings.hpp"
 
 namespace vclink::test
 {
@@ -45,16 +46,10 @@ std::string withOtherLineEnds(Random &random, const std::string &content)
 } // namespace
 
 RefreshHazards::RefreshHazards(Random &random, const GitRepository &repository)
-    : random_(random), repository_(repository)
+    : random_(random), repository_(repository),
+      tracked_(split(repository.git({"ls-files", "-z"}), '\0'))
 {
-    std::istringstream names(repository.git({"ls-files", "-z"}));
-    for (std::string name; std::getline(names, name, '\0');)
-    {
-        if (tracked_.empty() || tracked_.back() != name)
-        {
-            tracked_.push_back(name);
-        }
-    }
+    tracked_.erase(std::unique(tracked_.begin(), tracked_.end()), tracked_.end());
 }
 
 void RefreshHazards::add()

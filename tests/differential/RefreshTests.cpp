@@ -10,10 +10,10 @@
 #include "RandomWorkingCopy.hpp"
 #include "RefreshHazards.hpp"
 #include "RefreshedIndex.hpp"
-#include "numberFrom.hpp"
 #include "support/GitFixture.hpp"
 #include "support/LibGit2Session.hpp"
 #include "support/UnprivilegedUser.hpp"
+#include "support/numberFrom.hpp"
 
 namespace
 {

@@ -2,9 +2,8 @@
 #include "RefreshedIndex.hpp"
 
 #include <cerrno>
-#include <memory>
 #include <sstream>
-#include <stdexcept>
+#include <string>
 
 #include <fcntl.h>
 #include <git2.h>
@@ -12,7 +11,7 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
-#include "error/errorUtil/libgit2Errors.hpp"
+#include "error/errorUtil/GitResult.hpp"
 #include "main/files/indexRefresh.hpp"
 #include "main/files/stageChangedFiles.hpp"
 #include "quoting.hpp"
@@ -24,47 +23,30 @@ namespace vclink::test
 namespace
 {
 
-/// Its text is the code, class and text of libgit2's failure.
-class FloorFailure : public std::runtime_error
-{
-  public:
-    using std::runtime_error::runtime_error;
-};
+using git::acquire;
+using git::check;
 
-void require(int code)
+struct HiddenFile
 {
-    if (code != 0)
-    {
-        const git_error *const error = git_error_last();
-        const std::string text = error != nullptr
-                                     ? std::to_string(error->klass) + ' ' + error->message
-                                     : std::string("0 ");
-        throw FloorFailure(std::to_string(code) + ' ' + text);
-    }
-}
+    std::string path;
+};
 
 struct Opened
 {
     explicit Opened(const GitRepository &repository)
+        : handle(acquire<git_repository>(git_repository_open, repository.path().c_str()).value()),
+          index(acquire<git_index>(git_repository_index, handle.get()).value())
     {
-        git_repository *raw = nullptr;
-        require(git_repository_open(&raw, repository.path().c_str()));
-        handle.reset(raw);
-        git_index *rawIndex = nullptr;
-        require(git_repository_index(&rawIndex, raw));
-        index.reset(rawIndex);
-        require(git_index_read(rawIndex, 1));
+        check(git_index_read, index.get(), 1);
     }
 
-    std::unique_ptr<git_repository, void (*)(git_repository *)> handle{nullptr,
-                                                                       git_repository_free};
-    std::unique_ptr<git_index, void (*)(git_index *)> index{nullptr, git_index_free};
+    git::OwnedHandle<git_repository> handle;
+    git::OwnedHandle<git_index> index;
 };
 
-std::string idText(const git_oid &id)
+std::string textOfHidden(const std::string &path)
 {
-    char text[GIT_OID_HEXSZ + 1];
-    return git_oid_tostr(text, sizeof text, &id);
+    return "can't see " + quote(path);
 }
 
 std::string textOf(git_index *index)
@@ -74,7 +56,7 @@ std::string textOf(git_index *index)
     {
         const git_index_entry &entry = *git_index_get_byindex(index, i);
         lines << quote(entry.path) << std::oct << ' ' << entry.mode << std::dec << ' '
-              << idText(entry.id) << ' ' << git_index_entry_stage(&entry) << " flags "
+              << git_oid_tostr_s(&entry.id) << ' ' << git_index_entry_stage(&entry) << " flags "
               << (entry.flags & GIT_INDEX_ENTRY_VALID) << ' '
               << (entry.flags_extended & GIT_INDEX_ENTRY_EXTENDED_FLAGS) << " size "
               << entry.file_size << " times " << entry.mtime.seconds << '.'
@@ -88,7 +70,7 @@ std::string textOf(git_index *index)
         for (int side = 0; side < 3; ++side)
         {
             lines << ' ' << std::oct << entry.mode[side] << std::dec << ' '
-                  << (entry.mode[side] != 0 ? idText(entry.oid[side]) : "-");
+                  << (entry.mode[side] != 0 ? git_oid_tostr_s(&entry.oid[side]) : "-");
         }
         lines << '\n';
     }
@@ -127,11 +109,11 @@ void putBackLeftOut(const GitRepository &repository, git_index *index)
         }
         if ((entry->flags_extended & GIT_INDEX_ENTRY_SKIP_WORKTREE) != 0)
         {
-            require(git_index_add(index, entry));
+            check(git_index_add, index, entry);
         }
         else if (isHidden(repository, entry->path))
         {
-            throw FloorFailure("can't see " + quote(entry->path));
+            throw HiddenFile{entry->path};
         }
     }
 }
@@ -154,7 +136,7 @@ bool isBehindLink(const GitRepository &repository, const std::string &path)
 void addEmptied(const GitRepository &repository, git_index *index)
 {
     git_oid empty;
-    require(git_odb_hash(&empty, "", 0, GIT_OBJECT_BLOB));
+    check(git_odb_hash, &empty, "", std::size_t{0}, GIT_OBJECT_BLOB);
     for (std::size_t i = 0; i < git_index_entrycount(index); ++i)
     {
         const git_index_entry entry = *git_index_get_byindex(index, i);
@@ -170,7 +152,7 @@ void addEmptied(const GitRepository &repository, git_index *index)
             entry.mode == (isExecutable ? GIT_FILEMODE_BLOB_EXECUTABLE : GIT_FILEMODE_BLOB);
         if (isLookedAt && isEmptied && !isAsNoted && !isBehindLink(repository, entry.path))
         {
-            require(git_index_add_bypath(index, std::string(entry.path).c_str()));
+            check(git_index_add_bypath, index, std::string(entry.path).c_str());
         }
     }
 }
@@ -182,7 +164,7 @@ std::string textOf(const git::GitError &error)
     if (text.compare(0, name.size(), name) == 0)
     {
         const auto end = text.find("', which is tracked");
-        return "can't see " + quote(text.substr(name.size(), end - name.size()));
+        return textOfHidden(text.substr(name.size(), end - name.size()));
     }
     return std::to_string(error.getCode()) + ' ' + std::to_string(error.getErrorClass()) + ' ' +
            text;
@@ -196,14 +178,17 @@ std::string refreshByLibGit2(const GitRepository &repository)
     {
         const Opened opened(repository);
         addEmptied(repository, opened.index.get());
-        git_error_clear();
-        require(git_index_update_all(opened.index.get(), nullptr, nullptr, nullptr));
+        check(git_index_update_all, opened.index.get(), nullptr, nullptr, nullptr);
         putBackLeftOut(repository, opened.index.get());
         return textOf(opened.index.get());
     }
-    catch (const FloorFailure &failure)
+    catch (const HiddenFile &hidden)
     {
-        return failure.what();
+        return textOfHidden(hidden.path);
+    }
+    catch (const git::LibGit2Exception &exception)
+    {
+        return textOf(exception.getError());
     }
 }
 

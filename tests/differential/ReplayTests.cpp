@@ -16,14 +16,14 @@
 
 #include "FloorMerge.hpp"
 #include "MergeHistory.hpp"
+#include "expectedStates.hpp"
 #include "mergeDifferences.hpp"
 #include "support/GitFixture.hpp"
 #include "support/LibGit2Session.hpp"
 #include "support/RepositoryState.hpp"
-#include "support/TestInteractor.hpp"
+#include "support/adapterFor.hpp"
 #include "support/text.hpp"
 #include "vclink/git/BranchManager.hpp"
-#include "vclink/git/GitAdapterFactory.hpp"
 #include "vclink/git/GitException.hpp"
 #include "vclink/git/messageIdentifiers.hpp"
 
@@ -33,14 +33,11 @@ namespace
 namespace fs = std::filesystem;
 using vclink::git::BranchManager;
 using vclink::git::GitException;
-using vclink::test::asBytes;
-using vclink::test::asPath;
 using vclink::test::asUtf8;
 using vclink::test::GitRepository;
 using vclink::test::MergeCommit;
 using vclink::test::MergedPaths;
 using vclink::test::MergeHistory;
-using States = std::map<std::string, vclink::FileState::State>;
 
 constexpr std::uint64_t mergeBlocks = 8;
 constexpr std::size_t mergeCount = 208;
@@ -53,12 +50,6 @@ const Arguments noFolderRenames{"-c", "merge.directoryRenames=false"};
 
 constexpr auto committed = "committed";
 constexpr auto conflicts = "conflicts";
-
-std::unique_ptr<vclink::CMAdapter> makeAdapter(const GitRepository &repository)
-{
-    return vclink::git::GitAdapterFactory().createAdapterFor(
-        asPath(repository.path()), std::make_shared<vclink::test::TestInteractor>());
-}
 
 /// What the host is told when a merge leaves conflicts.
 std::string conflictText(const std::string &name)
@@ -94,8 +85,8 @@ class MergeReplay : public vclink::test::GitFixture,
         {
             GitRepository::clone(source.path(), copy->path());
         }
-        adapter_ = makeAdapter(library_);
-        floorAdapter_ = makeAdapter(floor_);
+        adapter_ = adapterFor(library_);
+        floorAdapter_ = adapterFor(floor_);
         manager_ = BranchManager::create(*adapter_);
     }
     ~MergeReplay() override
@@ -177,7 +168,7 @@ class MergeReplay : public vclink::test::GitFixture,
         EXPECT_EQ(byLibrary.underWay, byFloor.underWay);
         EXPECT_EQ(byLibrary.index, byFloor.index);
         EXPECT_EQ(byLibrary.workingTree, byFloor.workingTree);
-        EXPECT_EQ(statesOf(*adapter_), statesOf(*floorAdapter_));
+        EXPECT_EQ(vclink::test::statesOfAll(*adapter_), vclink::test::statesOfAll(*floorAdapter_));
     }
 
     void compareWithGit(const MergeCommit &merge, const std::string &outcome)
@@ -265,17 +256,6 @@ class MergeReplay : public vclink::test::GitFixture,
         return repository.git({"log", "-1", "--format=%T %P"});
     }
 
-    static States statesOf(vclink::CMAdapter &adapter)
-    {
-        const std::string root = asBytes(adapter.getRootFolder());
-        States states;
-        for (const auto &[path, state] : adapter.getFolderStates(adapter.getRootFolder()))
-        {
-            states.emplace(asBytes(path).substr(root.size()), state.getState());
-        }
-        return states;
-    }
-
     vclink::test::LibGit2Session session_{environment()};
     GitRepository library_{folder() / "library"};
     GitRepository floor_{folder() / "floor"};
@@ -326,11 +306,8 @@ TEST_F(MergeHistories, HoldMergesOfEveryKindAndSeveralMergeBases)
             repository.git({"merge-base", "--all", merge.firstParent, merge.secondParent});
         severalBases += std::count(bases.begin(), bases.end(), '\n') > 1 ? 1 : 0;
     }
-    for (std::size_t kind = 0; kind < vclink::test::MergeEdits::kindCount(); ++kind)
-    {
-        const auto name = vclink::test::MergeEdits::nameOfKind(kind);
-        EXPECT_EQ(kinds.count(name), 1u) << name;
-    }
+    for (const auto &kind : vclink::test::MergeEdits::kinds())
+        EXPECT_EQ(kinds.count(kind.name), 1u) << kind.name;
     EXPECT_GE(severalBases, 10);
 }
 

@@ -3,8 +3,6 @@
 
 #include <array>
 #include <cstdint>
-#include <fstream>
-#include <iterator>
 #include <sstream>
 #include <vector>
 
@@ -12,6 +10,7 @@
 #include <sys/stat.h>
 
 #include "error/errorUtil/GitResult.hpp"
+#include "support/readFile.hpp"
 
 namespace vclink::test
 {
@@ -26,12 +25,6 @@ using git::OwnedHandle;
 constexpr std::array filesUnderWay{
     "MERGE_HEAD",   "MERGE_MSG",  "MERGE_MODE", "CHERRY_PICK_HEAD", "REVERT_HEAD",
     "vclink-merge", "index.lock", "HEAD.lock",  "config.lock",      "packed-refs.lock"};
-
-std::string readFile(const fs::path &file)
-{
-    std::ifstream stream(file, std::ios::binary);
-    return {std::istreambuf_iterator<char>(stream), {}};
-}
 
 void readEntry(const fs::path &path, const std::string &name, Snapshot &snapshot)
 {

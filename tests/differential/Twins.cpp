@@ -3,7 +3,6 @@
 
 #include <exception>
 #include <sstream>
-#include <stdexcept>
 
 #include <boost/variant/get.hpp>
 #include <gtest/gtest.h>
@@ -11,9 +10,8 @@
 #include "foundation/core/except/IMsgIDException.hpp"
 #include "quoting.hpp"
 #include "support/RepositoryState.hpp"
-#include "support/TestInteractor.hpp"
+#include "support/adapterFor.hpp"
 #include "support/text.hpp"
-#include "vclink/git/GitAdapterFactory.hpp"
 #include "vclink/git/GitException.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
 
@@ -23,15 +21,6 @@ namespace
 {
 
 namespace fs = std::filesystem;
-
-void runImport(const Command &command)
-{
-    const CommandResult result = command.run();
-    if (!result.succeeded())
-    {
-        throw std::runtime_error(command.text() + ": " + result.errors);
-    }
-}
 
 void replaceAll(std::string &text, const std::string &from, const std::string &to)
 {
@@ -59,9 +48,7 @@ std::string makeStream(const std::string &branch, const std::vector<PlannedFile>
 
 Twins::Twins(const fs::path &folder)
     : library_(folder / "library"), git_(folder / "git"),
-      adapter_(git::GitAdapterFactory().createAdapterFor(asPath((folder / "library").string()),
-                                                         std::make_shared<TestInteractor>())),
-      model_(git_.repository())
+      adapter_(adapterFor(library_.repository())), model_(git_.repository())
 {
 }
 
@@ -145,8 +132,10 @@ void Twins::branch(const std::string &name, const std::vector<PlannedFile> &file
     }
     for (auto *twin : {&library_, &git_})
     {
-        runImport(
-            twin->repository().command({"fast-import", "--quiet"}).input(makeStream(name, files)));
+        twin->repository()
+            .command({"fast-import", "--quiet"})
+            .input(makeStream(name, files))
+            .runOrThrow();
         describeHead(*twin, ".git/refs/heads/" + name);
     }
 }
@@ -235,9 +224,7 @@ bool Twins::areAlike()
 void Twins::adopt()
 {
     describeHead(library_, headFile());
-    fs::remove_all(git_.repository().path());
-    fs::copy(library_.repository().path(), git_.repository().path(),
-             fs::copy_options::recursive | fs::copy_options::copy_symlinks);
+    library_.repository().copyTo(git_.repository().path());
     git_.commits = library_.commits;
 }
 
@@ -291,13 +278,7 @@ void Twins::compare()
         EXPECT_EQ(fs::exists(library_.repository() / name), fs::exists(git_.repository() / name))
             << name;
     }
-    States states;
-    const std::size_t root = library_.repository().path().string().size() + 1;
-    for (const auto &[path, state] : adapter_->getFolderStates(adapter_->getRootFolder()))
-    {
-        states.emplace(asBytes(path).substr(root), state.getState());
-    }
-    EXPECT_EQ(states, model_.states());
+    EXPECT_EQ(statesOfAll(*adapter_), model_.states());
 }
 
 std::string Twins::headFile() const

@@ -3,7 +3,6 @@
 
 #include <fstream>
 #include <sstream>
-#include <stdexcept>
 
 #include <fcntl.h>
 #include <sys/stat.h>
@@ -16,30 +15,6 @@ namespace
 {
 
 namespace fs = std::filesystem;
-
-std::string joinWithNul(const std::vector<std::string> &texts)
-{
-    std::string joined;
-    for (const auto &text : texts)
-    {
-        joined += text + '\0';
-    }
-    return joined;
-}
-
-std::string data(const std::string &bytes)
-{
-    return "data " + std::to_string(bytes.size()) + '\n' + bytes + '\n';
-}
-
-void run(const Command &command)
-{
-    const CommandResult result = command.run();
-    if (!result.succeeded())
-    {
-        throw std::runtime_error(command.text() + ": " + result.errors);
-    }
-}
 
 void dateBack(const fs::path &path)
 {
@@ -78,19 +53,20 @@ std::vector<std::string> WorkingCopyMaker::import(const std::vector<PlannedFile>
     std::string stream;
     for (std::size_t i = 0; i < blobs.size(); ++i)
     {
-        stream += "blob\nmark :" + std::to_string(i + 1) + '\n' + data(blobs[i]);
+        stream += "blob\nmark :" + std::to_string(i + 1) + '\n' + asFastImportData(blobs[i]);
         stream += "get-mark :" + std::to_string(i + 1) + '\n';
     }
     if (!files.empty())
     {
         stream += "commit refs/heads/main\ncommitter A <a@example.com> 1577836800 +0000\n";
-        stream += data("first");
+        stream += asFastImportData("first");
     }
     for (const auto &file : files)
     {
         const bool submodule = file.mode == "160000";
         stream += "M " + file.mode + (submodule ? ' ' + file.content : std::string(" inline"));
-        stream += ' ' + quote(file.path) + '\n' + (submodule ? std::string() : data(file.content));
+        stream += ' ' + quote(file.path) + '\n' +
+                  (submodule ? std::string() : asFastImportData(file.content));
         note("commit " + file.mode + ' ' + quote(file.path) + " with " + quote(file.content));
     }
     // Marks are answered on the standard output, a line each; the objects stay in one pack.
@@ -98,12 +74,7 @@ std::vector<std::string> WorkingCopyMaker::import(const std::vector<PlannedFile>
                                 .command({"-c", "fastimport.unpackLimit=1", "fast-import",
                                           "--quiet", "--cat-blob-fd=1"})
                                 .input(stream);
-    const CommandResult result = command.run();
-    if (!result.succeeded())
-    {
-        throw std::runtime_error(command.text() + ": " + result.errors);
-    }
-    std::istringstream lines(result.output);
+    std::istringstream lines(command.runOrThrow());
     std::vector<std::string> ids(blobs.size());
     for (auto &id : ids)
     {
@@ -179,15 +150,17 @@ void WorkingCopyMaker::copyRepository(const fs::path &source, const std::string 
 void WorkingCopyMaker::stage(const std::vector<std::string> &paths)
 {
     noteAll("stage", paths);
-    run(repository_.command({"update-index", "-z", "--add", "--remove", "--replace", "--stdin"})
-            .input(joinWithNul(paths)));
+    repository_.command({"update-index", "-z", "--add", "--remove", "--replace", "--stdin"})
+        .input(joinWithNul(paths))
+        .runOrThrow();
 }
 
 void WorkingCopyMaker::unstage(const std::vector<std::string> &paths)
 {
     noteAll("git rm --cached", paths);
-    run(repository_.command({"update-index", "-z", "--force-remove", "--stdin"})
-            .input(joinWithNul(paths)));
+    repository_.command({"update-index", "-z", "--force-remove", "--stdin"})
+        .input(joinWithNul(paths))
+        .runOrThrow();
 }
 
 void WorkingCopyMaker::setIndex(const std::vector<IndexSide> &sides)
@@ -200,16 +173,17 @@ void WorkingCopyMaker::setIndex(const std::vector<IndexSide> &sides)
         input += line + '\0';
         note("update-index --index-info " + quote(line));
     }
-    run(repository_.command({"update-index", "-z", "--index-info"}).input(input));
+    repository_.command({"update-index", "-z", "--index-info"}).input(input).runOrThrow();
 }
 
 void WorkingCopyMaker::intendToAdd(const std::vector<std::string> &paths)
 {
     noteAll("git add --intent-to-add", paths);
-    run(repository_
-            .command({"--literal-pathspecs", "add", "--intent-to-add", "--force",
-                      "--pathspec-from-file=-", "--pathspec-file-nul"})
-            .input(joinWithNul(paths)));
+    repository_
+        .command({"--literal-pathspecs", "add", "--intent-to-add", "--force",
+                  "--pathspec-from-file=-", "--pathspec-file-nul"})
+        .input(joinWithNul(paths))
+        .runOrThrow();
 }
 
 void WorkingCopyMaker::settle()

@@ -3,7 +3,10 @@
 
 #include <vector>
 
+#include <gtest/gtest.h>
+
 #include "moves.hpp"
+#include "support/text.hpp"
 
 namespace vclink::test
 {
@@ -68,6 +71,24 @@ bool isKnown(const std::string &path, const States &states)
 }
 
 } // namespace
+
+States statesByPath(const std::string &root, const FileStateMap &states)
+{
+    States below;
+    for (const auto &[path, state] : states)
+    {
+        const std::string name = asBytes(path);
+        EXPECT_EQ(name.substr(0, root.size() + 1), root + '/');
+        below.emplace(name.substr(root.size() + 1), state.getState());
+    }
+    return below;
+}
+
+States statesOfAll(CMAdapter &adapter)
+{
+    const upath root = adapter.getRootFolder();
+    return statesByPath(asBytes(root), adapter.getFolderStates(root));
+}
 
 States expectedStates(const GitReport &report, const Blobs &blobs,
                       const std::function<bool(const std::string &path)> &isAsked)

@@ -2,9 +2,11 @@
 #include "mergeDifferences.hpp"
 
 #include <algorithm>
-#include <iterator>
 #include <sstream>
 #include <string_view>
+
+#include "listedNames.hpp"
+#include "support/strings.hpp"
 
 namespace vclink::test
 {
@@ -31,7 +33,7 @@ std::string withoutSide(const std::string &name, const MergeCommit &merge)
 bool holdsSomething(const std::map<std::string, std::string> &names, const std::string &folder)
 {
     const auto first = names.lower_bound(folder + '/');
-    return first != names.end() && isIn(first->first, folder);
+    return first != names.end() && isBelow(first->first, folder);
 }
 
 bool holdsFile(const std::map<std::string, std::string> &files, const std::string &modeAndId)
@@ -71,13 +73,10 @@ MergedPaths readMergedPaths(const GitRepository &repository, const MergeCommit &
     MergedPaths paths;
     for (const auto &[name, text] : indexOf(repository))
     {
-        std::istringstream lines(text);
-        for (std::string line; std::getline(lines, line);)
-        {
-            MergedPath &path = paths[withoutSide(name, merge)];
-            path.entries.insert(line);
-            path.entryNames.insert(name);
-        }
+        const auto lines = split(text);
+        MergedPath &path = paths[withoutSide(name, merge)];
+        path.entries.insert(lines.begin(), lines.end());
+        path.entryNames.insert(name);
     }
     const auto files = workingTreeOf(repository);
     for (const auto &[name, content] : files)
@@ -181,9 +180,9 @@ bool MergeExplanations::hasTwoFiles(const std::string &path) const
 MergeExplanations::Files MergeExplanations::listFiles(const GitRepository &repository,
                                                       const std::string &commit)
 {
-    std::istringstream records(repository.git({"ls-tree", "-r", "-z", "--full-tree", commit}));
     Files files;
-    for (std::string record; std::getline(records, record, '\0');)
+    for (const auto &record :
+         split(repository.git({"ls-tree", "-r", "-z", "--full-tree", commit}), '\0'))
     {
         const auto tab = record.find('\t');
         std::string file = record.substr(0, tab);
@@ -196,15 +195,12 @@ MergeExplanations::Files MergeExplanations::listFiles(const GitRepository &repos
 void MergeExplanations::addRenames(const GitRepository &repository, const std::string &base,
                                    const std::string &side)
 {
-    std::istringstream fields(repository.git({"diff-tree", "-r", "-z", "--find-renames",
-                                              "--diff-filter=R", "--name-status", base, side}));
-    std::string status;
-    for (std::string from, to; std::getline(fields, status, '\0') &&
-                               std::getline(fields, from, '\0') && std::getline(fields, to, '\0');)
-    {
-        renamed_.insert(from);
-        renamed_.insert(to);
-    }
+    // Status, old name, new name.
+    const auto fields = split(repository.git({"diff-tree", "-r", "-z", "--find-renames",
+                                              "--diff-filter=R", "--name-status", base, side}),
+                              '\0');
+    for (std::size_t at = 0; at < fields.size(); at += 3)
+        renamed_.insert({fields.at(at + 1), fields.at(at + 2)});
 }
 
 bool MergeExplanations::isFolderInTheWay(const std::string &path) const

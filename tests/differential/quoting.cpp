@@ -60,4 +60,12 @@ std::string asFastImportData(const std::string &bytes)
     return "data " + std::to_string(bytes.size()) + '\n' + bytes + '\n';
 }
 
+std::string joinWithNul(const std::vector<std::string> &paths)
+{
+    std::string joined;
+    for (const auto &path : paths)
+        joined += path + '\0';
+    return joined;
+}
+
 } // namespace vclink::test

@@ -2,6 +2,7 @@
 #pragma once
 
 #include <string>
+#include <vector>
 
 namespace vclink::test
 {
@@ -15,5 +16,8 @@ std::string quoteConfigValue(const std::string &value);
 
 /// A content, or a message of a commit, as fast-import reads it.
 std::string asFastImportData(const std::string &bytes);
+
+/// Paths as commands of git read them with "-z".
+std::string joinWithNul(const std::vector<std::string> &paths);
 
 } // namespace vclink::test

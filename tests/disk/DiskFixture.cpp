@@ -9,6 +9,7 @@
 #include <unistd.h>
 
 #include "support/UnprivilegedUser.hpp"
+#include "support/strings.hpp"
 
 namespace vclink::test
 {
@@ -28,20 +29,15 @@ void takeBack(const fs::path &path)
     }
 }
 
-bool begins(const std::string &text, const std::string &beginning)
-{
-    return text.compare(0, beginning.size(), beginning) == 0;
-}
-
 /// An error of libgit2 has its class and its text; a merge wraps it. The reader of a folder that
 /// cannot be entered throws the standard library's exception.
 bool isTyped(const std::string &outcome)
 {
-    if (begins(outcome, "vclink::git::LibGit2Exception "))
+    if (startsWith(outcome, "vclink::git::LibGit2Exception "))
         return outcome.find(", class 0:") == std::string::npos && outcome.back() != ' ';
-    return begins(outcome, "vclink::git::GitException: ") ||
-           begins(outcome, "foundation::core::except::Exception<") ||
-           begins(outcome, "boost::filesystem::filesystem_error: ");
+    return startsWith(outcome, "vclink::git::GitException: ") ||
+           startsWith(outcome, "foundation::core::except::Exception<") ||
+           startsWith(outcome, "boost::filesystem::filesystem_error: ");
 }
 
 } // namespace
@@ -51,7 +47,7 @@ std::vector<Operation> operationsThatWrite()
     std::vector<Operation> operations;
     std::copy_if(allOperations().begin(), allOperations().end(), std::back_inserter(operations),
                  [](const Operation &operation)
-                 { return operation.writes && !begins(operation.name, "read"); });
+                 { return operation.writes && !startsWith(operation.name, "read"); });
     return operations;
 }
 

@@ -8,12 +8,14 @@
 #include <sys/stat.h>
 
 #include "DiskFixture.hpp"
+#include "support/strings.hpp"
 
 namespace
 {
 
 namespace fs = std::filesystem;
 using vclink::test::Action;
+using vclink::test::startsWith;
 
 /// Takes permissions from a file, or from a folder and all folders in it, as long as it lives.
 class Withheld
@@ -62,11 +64,6 @@ struct Lack
     mode_t mode;
 };
 
-bool beginsWith(const std::string &text, const std::string &beginning)
-{
-    return text.compare(0, beginning.size(), beginning) == 0;
-}
-
 std::string replaced(std::string text, const std::string &from, const std::string &to)
 {
     for (auto at = text.find(from); at != std::string::npos; at = text.find(from, at + to.size()))
@@ -81,7 +78,7 @@ class WithoutPermission : public vclink::test::DiskFixture
     {
         const fs::path root = trial().repository().path();
         const std::string &name = GetParam().name;
-        if (beginsWith(name, "write"))
+        if (startsWith(name, "write"))
             return {{environment().home(), 0555}, {environment().home() / ".gitconfig", 0000}};
         std::vector<Lack> all{
             {root, 0555},
@@ -105,7 +102,7 @@ class WithoutPermission : public vclink::test::DiskFixture
     std::vector<std::string> otherGists(const fs::path &path) const
     {
         // A status walk that fails finds no files.
-        if (beginsWith(GetParam().name, "addFiles"))
+        if (startsWith(GetParam().name, "addFiles"))
             return {gistBefore()};
         // As a configuration that is not there: the identity comes from the environment.
         if (path.filename() == "config")
@@ -121,7 +118,7 @@ class WithoutPermission : public vclink::test::DiskFixture
     {
         const bool isHeadless =
             lack.mode == 0000 && (lack.path.filename() == "HEAD" || lack.path.filename() == "refs");
-        if (beginsWith(GetParam().name, "revertFiles") && isHeadless)
+        if (startsWith(GetParam().name, "revertFiles") && isHeadless)
             return {"entry file", "entry other"};
         return {};
     }

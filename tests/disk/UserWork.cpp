@@ -2,23 +2,14 @@
 #include "UserWork.hpp"
 
 #include <filesystem>
-#include <sstream>
 #include <system_error>
+
+#include "support/strings.hpp"
 
 namespace vclink::test
 {
 namespace
 {
-
-std::vector<std::string> linesOf(const GitRepository &repository,
-                                 const std::vector<std::string> &arguments)
-{
-    std::vector<std::string> lines;
-    std::istringstream stream(repository.git(arguments));
-    for (std::string line; std::getline(stream, line);)
-        lines.push_back(line);
-    return lines;
-}
 
 bool stands(const UserWork &work, const std::string &name, const std::string &value)
 {
@@ -30,7 +21,7 @@ bool stands(const UserWork &work, const std::string &name, const std::string &va
 
 std::vector<std::string> uncommittedFiles(const GitRepository &repository)
 {
-    return linesOf(repository, {"ls-files", "--modified", "--others"});
+    return split(repository.git({"ls-files", "--modified", "--others"}));
 }
 
 UserWork userWork(const GitRepository &repository, const std::vector<std::string> &files)
@@ -43,7 +34,7 @@ UserWork userWork(const GitRepository &repository, const std::vector<std::string
             work.emplace("file " + file, repository.read(file));
     }
     // "MODE ID STAGE\tNAME"; of a conflict our side.
-    for (const auto &line : linesOf(repository, {"ls-files", "--stage"}))
+    for (const auto &line : split(repository.git({"ls-files", "--stage"})))
     {
         const auto tab = line.find('\t');
         const char stage = line.at(tab - 1);
@@ -51,7 +42,7 @@ UserWork userWork(const GitRepository &repository, const std::vector<std::string
             work.emplace("entry " + line.substr(tab + 1), line.substr(0, tab - 2));
     }
     // Ids of commits differ from run to run, those of trees do not.
-    for (const auto &line : linesOf(repository, {"for-each-ref", "--format=%(refname) %(tree)"}))
+    for (const auto &line : split(repository.git({"for-each-ref", "--format=%(refname) %(tree)"})))
     {
         const auto blank = line.find(' ');
         work.emplace(line.substr(0, blank), line.substr(blank + 1));

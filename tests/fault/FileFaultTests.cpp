@@ -8,7 +8,6 @@
 #include <map>
 #include <random>
 #include <set>
-#include <sstream>
 #include <string>
 #include <vector>
 
@@ -23,7 +22,7 @@
 #include "error/errorUtil/callbackException.hpp"
 #include "support/NothingLeft.hpp"
 #include "support/libgit2/LibGit2Recorder.hpp"
-#include "support/text.hpp"
+#include "support/strings.hpp"
 
 namespace
 {
@@ -67,16 +66,10 @@ void expectStatesOfGit(const vclink::test::Trial &trial)
     const GitRepository &repository = trial.repository();
     const auto report = readGitReport(repository, vclink::test::runGitStatus(repository));
     const auto blobs = readBlobs(repository, moveCandidates(report));
-    vclink::git::GitAdapter &adapter = trial.adapter();
     const auto isFile = [](const std::string &path) { return path.back() != '/'; };
-    vclink::test::States states;
-    const std::size_t root = repository.path().string().size() + 1;
-    for (const auto &[path, state] : adapter.getFolderStates(adapter.getRootFolder()))
-    {
-        const std::string name = vclink::test::asBytes(path).substr(root);
-        if (isFile(name))
-            states.emplace(name, state.getState());
-    }
+    vclink::test::States states = vclink::test::statesOfAll(trial.adapter());
+    for (auto entry = states.begin(); entry != states.end();)
+        entry = isFile(entry->first) ? std::next(entry) : states.erase(entry);
     EXPECT_EQ(states, expectedStates(report, blobs, isFile));
 }
 
@@ -236,11 +229,7 @@ class FailingLookAtTheIndex : public FailingFileCall
     }
     std::vector<std::string> indexed() const
     {
-        std::vector<std::string> names;
-        std::istringstream lines(trial_.repository().git({"ls-files"}));
-        for (std::string name; std::getline(lines, name);)
-            names.push_back(name);
-        return names;
+        return vclink::test::split(trial_.repository().git({"ls-files"}));
     }
 
     const std::string index_ = trial_.repository().path() / ".git/index";

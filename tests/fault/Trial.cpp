@@ -13,6 +13,7 @@
 #include <unistd.h>
 
 #include "support/Descriptors.hpp"
+#include "support/strings.hpp"
 #include "support/text.hpp"
 
 namespace vclink::test
@@ -41,14 +42,9 @@ void copyTree(const fs::path &source, const fs::path &target)
     }
 }
 
-bool begins(const std::string &text, const std::string &beginning)
-{
-    return text.compare(0, beginning.size(), beginning) == 0;
-}
-
 bool isDone(const std::string &outcome)
 {
-    return begins(outcome, "done");
+    return startsWith(outcome, "done");
 }
 
 /// What writes more than objects, and what moves references.
@@ -188,7 +184,7 @@ void Trial::expectSound() const
 bool Trial::isLeftByLibGit2(const fs::path &file) const
 {
     const fs::path name = file.filename();
-    const bool isFileInConflict = begins(operation_.name, "merge") &&
+    const bool isFileInConflict = startsWith(operation_.name, "merge") &&
                                   file.parent_path() == repository_.path() &&
                                   name.extension() == ".lock";
     return name == "FETCH_HEAD.lock" || name == "MERGE_MSG.lock" || isFileInConflict;
@@ -223,7 +219,7 @@ void Trial::expectWorksAgain(const Action &action) const
     if (isDone(outcome) || outcome == normalOutcome_)
         return;
     EXPECT_FALSE(operation_.refusal.empty()) << outcome;
-    EXPECT_TRUE(begins(outcome, operation_.refusal)) << outcome;
+    EXPECT_TRUE(startsWith(outcome, operation_.refusal)) << outcome;
     for (const auto &command : operation_.clearing)
         repository_.git(command);
     outcome = outcomeOf(action);

@@ -2,7 +2,6 @@
 #include "expectedOutcomes.hpp"
 
 #include <algorithm>
-#include <iterator>
 #include <vector>
 
 #include <git2/errors.h>
@@ -10,6 +9,7 @@
 #include "Operation.hpp"
 #include "fl/i18n/MessageCatalog.hpp"
 #include "fl/i18n/VkLocale.hpp"
+#include "support/strings.hpp"
 #include "support/text.hpp"
 #include "vclink/git/messageIdentifiers.hpp"
 
@@ -41,14 +41,9 @@ struct Unexamined
     std::string function;
 };
 
-bool begins(const std::string &text, const std::string &beginning)
-{
-    return text.compare(0, beginning.size(), beginning) == 0;
-}
-
 bool isMerge(const std::string &operation)
 {
-    return begins(operation, "merge");
+    return startsWith(operation, "merge");
 }
 
 std::string textOf(const resource_core::BaseMsgID &message)
@@ -238,7 +233,8 @@ bool isUnexamined(const std::string &operation, const std::string &function)
     const auto &all = allUnexamined();
     return std::any_of(all.begin(), all.end(),
                        [&](const Unexamined &entry) {
-                           return begins(operation, entry.operations) && function == entry.function;
+                           return startsWith(operation, entry.operations) &&
+                                  function == entry.function;
                        });
 }
 
@@ -251,7 +247,7 @@ std::string expectedOutcome(const FaultSite &site, const std::string &normal)
         std::find_if(tolerances.begin(), tolerances.end(),
                      [&site](const Tolerance &tolerance)
                      {
-                         return begins(site.operation, tolerance.operations) &&
+                         return startsWith(site.operation, tolerance.operations) &&
                                 site.fault.function == tolerance.function &&
                                 (tolerance.call == any || tolerance.call == site.fault.call) &&
                                 (tolerance.code == any || tolerance.code == site.fault.code) &&

@@ -3,7 +3,6 @@
 
 #include <algorithm>
 #include <filesystem>
-#include <memory>
 #include <string>
 #include <unordered_set>
 #include <vector>
@@ -12,8 +11,7 @@
 #include <gtest/gtest.h>
 
 #include "support/GitFixture.hpp"
-#include "support/TestInteractor.hpp"
-#include "vclink/git/GitAdapterFactory.hpp"
+#include "support/adapterFor.hpp"
 
 namespace
 {
@@ -28,11 +26,6 @@ class HostPaths : public GitFixture
     upath pathOf(const std::string &name) const
     {
         return host_tools::toUpath(repository_ / name);
-    }
-    std::unique_ptr<vclink::CMAdapter> makeAdapter() const
-    {
-        return vclink::git::GitAdapterFactory().createAdapterFor(
-            host_tools::toUpath(repository_.path()), std::make_shared<TestInteractor>());
     }
 
     GitRepository repository_ = makeRepository();
@@ -88,7 +81,7 @@ TEST_F(HostPaths, OfFilesInConflictAreListed)
     for (const auto *name : {"a", "b", "c"})
         repository_.write(name, "first\n");
     repository_.commitAll("first");
-    EXPECT_THAT(host_tools::filesInConflict(*makeAdapter()), IsEmpty());
+    EXPECT_THAT(host_tools::filesInConflict(*adapterFor(repository_)), IsEmpty());
     repository_.git({"checkout", "--quiet", "-b", "topic"});
     repository_.write("a", "theirs\n");
     repository_.write("b", "theirs\n");
@@ -99,7 +92,7 @@ TEST_F(HostPaths, OfFilesInConflictAreListed)
     repository_.write("c", "ours\n");
     repository_.commitAll("ours");
     repository_.tryGit({"merge", "topic"});
-    EXPECT_EQ(host_tools::filesInConflict(*makeAdapter()),
+    EXPECT_EQ(host_tools::filesInConflict(*adapterFor(repository_)),
               (std::vector<upath>{pathOf("a"), pathOf("b")}));
 }
 

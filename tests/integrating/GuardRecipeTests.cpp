@@ -1,6 +1,5 @@
 // SPDX-License-Identifier: MIT
 #include <atomic>
-#include <memory>
 #include <shared_mutex>
 #include <string>
 #include <thread>
@@ -9,10 +8,9 @@
 
 #include "fl/filesystem/path.hpp"
 #include "support/GitFixture.hpp"
-#include "support/TestInteractor.hpp"
+#include "support/adapterFor.hpp"
 #include "support/text.hpp"
 #include "vclink/CMAdapter.hpp"
-#include "vclink/git/GitAdapterFactory.hpp"
 
 // examples/integrating/guard.cpp
 bool probe(std::shared_mutex &guards, const upath &folder);
@@ -59,8 +57,7 @@ TEST_F(GuardRecipe, FindsWorkingCopies)
 
 TEST_F(GuardRecipe, LosesNoCommandThoughAnotherThreadProbes)
 {
-    const auto adapter = vclink::git::GitAdapterFactory().createAdapterFor(
-        asPath(repository_.path()), std::make_shared<vclink::test::TestInteractor>());
+    const auto adapter = vclink::test::adapterFor(repository_);
     std::atomic<bool> isOver{false};
     std::atomic<int> probes{0};
     std::thread prober(

@@ -6,12 +6,11 @@
 
 #include "fl/filesystem/path.hpp"
 #include "support/GitFixture.hpp"
-#include "support/TestInteractor.hpp"
+#include "support/adapterFor.hpp"
 #include "support/text.hpp"
 #include "vclink/CMAdapter.hpp"
 #include "vclink/FileStateMap.hpp"
 #include "vclink/git/BranchManager.hpp"
-#include "vclink/git/GitAdapterFactory.hpp"
 
 // examples/integrating/states.cpp
 bool hasFilesInHead(const vclink::git::BranchManager &branches);
@@ -33,8 +32,7 @@ class StatesRecipe : public vclink::test::GitFixture
     }
 
     GitRepository repository_ = makeRepository();
-    std::unique_ptr<vclink::CMAdapter> adapter_ = vclink::git::GitAdapterFactory().createAdapterFor(
-        asPath(repository_.path()), std::make_shared<vclink::test::TestInteractor>());
+    std::unique_ptr<vclink::CMAdapter> adapter_ = vclink::test::adapterFor(repository_);
 };
 
 TEST_F(StatesRecipe, GivesTheStatesOfAllFiles)

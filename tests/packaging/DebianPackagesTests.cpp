@@ -5,7 +5,6 @@
 #include <filesystem>
 #include <fstream>
 #include <istream>
-#include <iterator>
 #include <map>
 #include <regex>
 #include <sstream>
@@ -16,6 +15,7 @@
 #include <gtest/gtest.h>
 
 #include "InstalledFixture.hpp"
+#include "support/readFile.hpp"
 
 namespace
 {
@@ -109,8 +109,7 @@ TEST_F(DebianPackages, OfTheLibraryWantsALibgit2WithTheKnownFixes)
     ASSERT_THAT(package, testing::MatchesRegex("libgit2-[0-9.]+ \\(>= [^)]+\\)"));
     EXPECT_THAT(depends, HasSubstr(package));
     // The table that people read says the same.
-    std::ifstream file(VCLINK_SOURCE_FOLDER "/docs/linking.md");
-    const std::string document(std::istreambuf_iterator<char>(file), {});
+    const std::string document = readFile(VCLINK_SOURCE_FOLDER "/docs/linking.md");
     const std::string version = package.substr(package.find(">= ") + 3);
     EXPECT_THAT(document, HasSubstr(version.substr(0, version.size() - 1)));
 }
@@ -174,8 +173,8 @@ TEST_F(DebianPackages, TellTheLicenceAsDebiansToolsReadIt)
     for (const auto &package : packages())
     {
         unpack({package.first});
-        std::ifstream copyright(folder() / "machine/usr/share/doc" / package.first / "copyright");
-        EXPECT_EQ(std::string(std::istreambuf_iterator<char>(copyright), {}), expected)
+        EXPECT_EQ(readFile(folder() / "machine/usr/share/doc" / package.first / "copyright"),
+                  expected)
             << package.first;
     }
 }

@@ -3,8 +3,6 @@
 // against an installation that was moved; and the examples that are installed with the documents.
 #include <filesystem>
 #include <fstream>
-#include <iterator>
-#include <sstream>
 #include <string>
 #include <vector>
 
@@ -12,6 +10,8 @@
 #include <gtest/gtest.h>
 
 #include "InstalledFixture.hpp"
+#include "support/readFile.hpp"
+#include "support/strings.hpp"
 
 namespace
 {
@@ -20,16 +20,10 @@ using namespace vclink::test;
 using testing::HasSubstr;
 using testing::SizeIs;
 
-std::string contentOf(const std::filesystem::path &file)
-{
-    std::ifstream stream(file);
-    return {std::istreambuf_iterator<char>(stream), {}};
-}
-
 /// The first block of this language.
 std::string blockOf(const std::string &language)
 {
-    const std::string page = contentOf(VCLINK_SOURCE_FOLDER "/docs/linking.md");
+    const std::string page = readFile(VCLINK_SOURCE_FOLDER "/docs/linking.md");
     const std::string mark = "\n```" + language + "\n";
     // The first block of the shell is about building.
     const auto begin = page.find(mark, page.find("## Linking")) + mark.size();
@@ -49,7 +43,7 @@ class DocumentedLines : public InstalledFixture
     void writeLoggingHost() const
     {
         std::ofstream source(folder() / "main.cpp");
-        source << contentOf(VCLINK_SOURCE_FOLDER "/examples/integrating/log.cpp")
+        source << readFile(VCLINK_SOURCE_FOLDER "/examples/integrating/log.cpp")
                << "#include \"vclink/git/LibGit2Guard.hpp\"\n"
                   "int main()\n{\n    showLog();\n    vclink::git::LibGit2Guard guard;\n}\n";
     }
@@ -84,10 +78,7 @@ class DocumentedLines : public InstalledFixture
 
 TEST_F(DocumentedLines, OfPkgConfigBuildAHostEach)
 {
-    std::istringstream block(blockOf("sh"));
-    std::vector<std::string> lines;
-    for (std::string line; std::getline(block, line);)
-        lines.push_back(line);
+    const std::vector<std::string> lines = split(blockOf("sh"));
     ASSERT_THAT(lines, SizeIs(3));
     writePlainHost();
     runLine(lines[0]);

@@ -4,13 +4,13 @@
 #include <algorithm>
 #include <filesystem>
 #include <fstream>
-#include <iterator>
 #include <string>
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include "InstalledFixture.hpp"
+#include "support/readFile.hpp"
 
 namespace
 {
@@ -19,12 +19,6 @@ using namespace vclink::test;
 using testing::HasSubstr;
 
 const std::filesystem::path project = VCLINK_SOURCE_FOLDER "/examples/embed";
-
-std::string readFile(const std::filesystem::path &file)
-{
-    std::ifstream stream(file);
-    return {std::istreambuf_iterator<char>(stream), {}};
-}
 
 /// The command in the head of the source.
 std::string commandOfSource()

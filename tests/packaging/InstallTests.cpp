@@ -13,6 +13,7 @@
 #include <gtest/gtest.h>
 
 #include "InstalledFixture.hpp"
+#include "support/readFile.hpp"
 
 namespace
 {
@@ -209,8 +210,7 @@ TEST_F(Component, NoneTellsWhereItWasBuiltOrInstalled)
     install(prefix, {"shell"});
     for (const auto &name : filesBelow(prefix))
     {
-        std::ifstream file(prefix / name, std::ios::binary);
-        const std::string bytes{std::istreambuf_iterator<char>(file), {}};
+        const std::string bytes = readFile(prefix / name);
         EXPECT_EQ(bytes.find(VCLINK_BUILD_FOLDER), std::string::npos) << name;
         EXPECT_EQ(bytes.find(VCLINK_SOURCE_FOLDER), std::string::npos) << name;
         EXPECT_EQ(bytes.find((folder() / "first").string()), std::string::npos) << name;

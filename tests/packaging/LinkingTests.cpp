@@ -13,6 +13,7 @@
 
 #include "InstalledFixture.hpp"
 #include "support/Command.hpp"
+#include "support/strings.hpp"
 
 namespace
 {
@@ -24,21 +25,12 @@ using testing::HasSubstr;
 using testing::IsEmpty;
 using testing::Not;
 
-std::vector<std::string> lines(const std::string &text)
-{
-    std::vector<std::string> all;
-    std::istringstream stream(text);
-    for (std::string line; std::getline(stream, line);)
-        all.push_back(line);
-    return all;
-}
-
 /// What the expression's first group matches, line by line.
 std::set<std::string> findAll(const std::string &text, const std::string &expression)
 {
     const std::regex wanted(expression);
     std::set<std::string> found;
-    for (const auto &line : lines(text))
+    for (const auto &line : split(text))
     {
         std::smatch match;
         if (std::regex_search(line, match, wanted))

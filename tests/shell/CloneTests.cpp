@@ -120,10 +120,10 @@ TEST_F(ShellClone, TakesNamesInAnyLetters)
 
 TEST_F(ShellClone, MakesAnEmptyWorkingCopyOfAnEmptyRepository)
 {
-    const GitRepository empty = daemon().makeRepository();
-    const GitRepository made = clone(daemon().url(empty));
+    const GitRepository empty = server().makeRepository();
+    const GitRepository made = clone(server().url(empty));
     EXPECT_EQ(made.git({"status", "--porcelain", "--ignored"}), "");
-    EXPECT_EQ(made.line({"config", "remote.origin.url"}), daemon().url(empty));
+    EXPECT_EQ(made.line({"config", "remote.origin.url"}), server().url(empty));
 }
 
 TEST_F(ShellClone, TakesAnEmptyFolderAndNoOther)
@@ -171,7 +171,7 @@ TEST_F(ShellClone, TellsWhyThereIsNothingToClone)
     EXPECT_THAT(fail("nowhere"), HasSubstr("nowhere can't be found"));
     EXPECT_THAT(fail("strange://host/path"),
                 HasSubstr(libgit2_release::refusalOfScheme("strange://host/path")));
-    EXPECT_THAT(fail(daemon().base() + "/missing.git"), HasSubstr("no such repository"));
+    EXPECT_THAT(fail(server().base() + "/missing.git"), HasSubstr("no such repository"));
     const std::string silent = std::to_string(freePorts(1).front());
     EXPECT_THAT(fail("git://127.0.0.1:" + silent + "/a.git"), HasSubstr("Connection refused"));
 }

@@ -1,5 +1,4 @@
 // SPDX-License-Identifier: MIT
-#include <algorithm>
 #include <filesystem>
 #include <fstream>
 #include <map>
@@ -11,6 +10,7 @@
 #include <gtest/gtest.h>
 
 #include "ShellFixture.hpp"
+#include "support/readFile.hpp"
 
 namespace vclink::test
 {
@@ -167,10 +167,8 @@ class Twin
                         fs::read_symlink(entry->path());
                 else if (entry->is_regular_file())
                 {
-                    std::ifstream file(entry->path());
-                    const std::string content(std::istreambuf_iterator<char>(file), {});
                     files[entry->path().lexically_relative(folder_)] =
-                        std::regex_replace(content, label, "$1");
+                        std::regex_replace(readFile(entry->path()), label, "$1");
                 }
             }
         }

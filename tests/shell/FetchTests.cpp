@@ -98,7 +98,7 @@ TEST_F(ShellFetch, RefusesARemoteThatIsNotConfigured)
 
 TEST_F(ShellFetch, TellsWhyARemoteCannotBeReached)
 {
-    repository_.git({"remote", "set-url", "origin", daemon().base() + "/missing.git"});
+    repository_.git({"remote", "set-url", "origin", server().base() + "/missing.git"});
     EXPECT_THAT(refuse({"fetch", "origin"}), HasSubstr("no such repository"));
     repository_.git({"remote", "set-url", "origin", "../missing"});
     for (const std::string command : {"fetch", "push", "heads"})

@@ -51,7 +51,7 @@ TEST_F(ShellHeads, AreThoseThatGitShows)
 
 TEST_F(ShellHeads, AreNoneForAnEmptyRemote)
 {
-    repository_.git({"remote", "set-url", "origin", daemon().url(daemon().makeRepository())});
+    repository_.git({"remote", "set-url", "origin", server().url(server().makeRepository())});
     const CommandResult result = run({"heads", "origin"});
     EXPECT_EQ(result.exitStatus, 0) << result.errors;
     EXPECT_THAT(result.output, IsEmpty());
@@ -92,7 +92,7 @@ TEST_F(ShellHeads, AreFoundFromTheRootWhereTheAddressIsARelativePath)
 TEST_F(ShellHeads, CannotBeAskedOfARemoteThatIsNotThere)
 {
     EXPECT_THAT(refuse({"heads", "nobody"}), HasSubstr("There is no remote 'nobody'."));
-    repository_.git({"remote", "set-url", "origin", daemon().base() + "/missing.git"});
+    repository_.git({"remote", "set-url", "origin", server().base() + "/missing.git"});
     EXPECT_THAT(refuse({"heads", "origin"}), HasSubstr("no such repository"));
 }
 

@@ -2,7 +2,6 @@
 #include <chrono>
 #include <csignal>
 #include <future>
-#include <memory>
 #include <thread>
 
 #include <gmock/gmock.h>
@@ -74,16 +73,16 @@ class ShellRemoteInterrupt : public ShellRemoteFixture
         RelayPlan plan;
         plan.blockSize = 4096;
         plan.pause = std::chrono::milliseconds(20);
-        return ScriptedServer(relayTo(daemon().port(), plan));
+        return ScriptedServer(relayTo(server().port(), plan));
     }
-    std::string urlAt(const ScriptedServer &server, const std::string &name) const
+    std::string urlAt(const ScriptedServer &scripted, const std::string &name) const
     {
-        return "git://127.0.0.1:" + std::to_string(server.port()) + name;
+        return "git://127.0.0.1:" + std::to_string(scripted.port()) + name;
     }
     /// The repository's address there.
-    std::string urlAt(const ScriptedServer &server) const
+    std::string urlAt(const ScriptedServer &scripted) const
     {
-        return urlAt(server, url_.substr(daemon().base().size()));
+        return urlAt(scripted, url_.substr(server().base().size()));
     }
 };
 

@@ -1,22 +1,8 @@
 // SPDX-License-Identifier: MIT
 #include "ShellFixture.hpp"
 
-#include <algorithm>
-
 namespace vclink::test
 {
-
-std::vector<std::string> split(const std::string &text, char end)
-{
-    std::vector<std::string> pieces;
-    for (std::size_t start = 0; start < text.size();)
-    {
-        const std::size_t stop = std::min(text.find(end, start), text.size());
-        pieces.push_back(text.substr(start, stop - start));
-        start = stop + 1;
-    }
-    return pieces;
-}
 
 Records parseRecords(const std::string &output, char end)
 {

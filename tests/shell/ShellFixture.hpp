@@ -9,6 +9,7 @@
 #include "support/Command.hpp"
 #include "support/GitFixture.hpp"
 #include "support/GitRepository.hpp"
+#include "support/strings.hpp"
 
 namespace vclink::test
 {
@@ -16,9 +17,6 @@ namespace vclink::test
 /// A record of the status command: state and name.
 using Record = std::pair<std::string, std::string>;
 using Records = std::vector<Record>;
-
-/// The pieces of a text, each of which ends with `end`.
-std::vector<std::string> split(const std::string &text, char end);
 
 /// Reads the output of the status command, whose lines end with `end`. A line that is not a record
 /// has an empty state in the result.

@@ -2,38 +2,11 @@
 #include "ShellRemoteFixture.hpp"
 
 #include <algorithm>
-#include <memory>
 
 #include "runOnTerminal.hpp"
 
 namespace vclink::test
 {
-namespace
-{
-
-std::unique_ptr<GitDaemon> &runningDaemon()
-{
-    static std::unique_ptr<GitDaemon> running;
-    return running;
-}
-
-} // namespace
-
-DaemonOfTheSuite::DaemonOfTheSuite()
-{
-    if (runningDaemon() == nullptr)
-        runningDaemon() = std::make_unique<GitDaemon>();
-}
-
-GitDaemon &DaemonOfTheSuite::daemon()
-{
-    return *runningDaemon();
-}
-
-void DaemonOfTheSuite::stopDaemon()
-{
-    runningDaemon().reset();
-}
 
 ShellRemoteFixture::ShellRemoteFixture()
 {
@@ -42,11 +15,6 @@ ShellRemoteFixture::ShellRemoteFixture()
     repository_.commitAll("begin");
     repository_.git({"remote", "add", "origin", url_});
     repository_.git({"push", "--quiet", "origin", "main"});
-}
-
-void ShellRemoteFixture::TearDownTestSuite()
-{
-    stopDaemon();
 }
 
 CommandResult ShellRemoteFixture::run(const std::vector<std::string> &arguments) const

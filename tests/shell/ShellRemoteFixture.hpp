@@ -7,31 +7,21 @@
 
 #include "ShellFixture.hpp"
 #include "transport/GitDaemon.hpp"
+#include "transport/ServerOfTheSuite.hpp"
 
 namespace vclink::test
 {
 
-/// Has a git daemon running before the test's own environment is made, since it outlives the test.
-/// It ends with the suite.
-class DaemonOfTheSuite
-{
-  protected:
-    DaemonOfTheSuite();
-
-    static GitDaemon &daemon();
-    static void stopDaemon();
-};
-
 /// Base of the tests of what works with a remote: a repository that a daemon serves, with the files
 /// "a" and "folder/b", and the working copy that they were pushed from, whose remote "origin" it
 /// is.
-class ShellRemoteFixture : public DaemonOfTheSuite, public ShellFixture
+class ShellRemoteFixture : public ServerOfTheSuite<GitDaemon>, public ShellFixture
 {
   protected:
     using References = std::map<std::string, std::string>;
 
+    using ServerOfTheSuite<GitDaemon>::TearDownTestSuite;
     ShellRemoteFixture();
-    static void TearDownTestSuite();
 
     /// Runs the program in the working copy.
     CommandResult run(const std::vector<std::string> &arguments) const;
@@ -50,8 +40,8 @@ class ShellRemoteFixture : public DaemonOfTheSuite, public ShellFixture
     /// Ids by name.
     static References references(const GitRepository &repository);
 
-    GitRepository served_ = daemon().makeRepository();
-    std::string url_ = daemon().url(served_);
+    GitRepository served_ = server().makeRepository();
+    std::string url_ = server().url(served_);
     GitRepository repository_ = makeRepository();
 };
 

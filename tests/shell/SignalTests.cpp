@@ -21,6 +21,7 @@
 
 #include "ShellFixture.hpp"
 #include "differential/Random.hpp"
+#include "support/numberFrom.hpp"
 
 namespace vclink::test
 {
@@ -32,12 +33,6 @@ using Clock = std::chrono::steady_clock;
 using std::chrono::microseconds;
 
 constexpr int fileCount = 300;
-
-std::uint64_t numberFrom(const char *variable, std::uint64_t otherwise)
-{
-    const char *text = std::getenv(variable);
-    return text == nullptr ? otherwise : std::strtoull(text, nullptr, 10);
-}
 
 /// A program in a folder, with nothing to read and nobody who reads.
 class Program

@@ -1,13 +1,12 @@
 // SPDX-License-Identifier: MIT
 #include <filesystem>
-#include <fstream>
-#include <iterator>
 #include <string>
 #include <vector>
 
 #include <gmock/gmock.h>
 
 #include "ShellMergeFixture.hpp"
+#include "support/readFile.hpp"
 
 namespace vclink::test
 {
@@ -43,9 +42,7 @@ class ShellStatements : public ShellMergeFixture
         commitFiles({{name, "ours\n"}});
         const std::filesystem::path words = folder() / "words";
         shell({"merge", "other"}).in(repository_.path()).environment("WORDS", words.string()).run();
-        std::ifstream file(words);
-        const std::string text(std::istreambuf_iterator<char>(file), {});
-        return split(text, '\n');
+        return split(readFile(words));
     }
 };
 
@@ -81,8 +78,7 @@ TEST_F(ShellStatements, KeywordsAreNotExpandedForACommand)
     commitFiles({{"a", "$Id$\nours\n"}});
     repository_.git({"config", "merge.copies.driver", "cp %A " + (folder() / "seen").string()});
     EXPECT_THAT(run({"merge", "other"}).output, StartsWith("Merge commit "));
-    std::ifstream file(folder() / "seen");
-    EXPECT_EQ(std::string(std::istreambuf_iterator<char>(file), {}), "$Id$\nours\n");
+    EXPECT_EQ(readFile(folder() / "seen"), "$Id$\nours\n");
 }
 
 TEST_F(ShellStatements, MergeRenormalizeIsNotRead)

@@ -2,10 +2,10 @@
 #include "sourceTexts.hpp"
 
 #include <cctype>
-#include <fstream>
-#include <iterator>
 #include <string_view>
 #include <vector>
+
+#include "support/readFile.hpp"
 
 namespace vclink::test
 {
@@ -130,9 +130,7 @@ SourceTexts readSourceTexts(const std::filesystem::path &folder)
         const std::string extension = entry.path().extension().string();
         if (isTable || (extension != ".cpp" && extension != ".hpp"))
             continue;
-        std::ifstream file(entry.path());
-        const std::string code(std::istreambuf_iterator<char>(file), {});
-        collect(tokenize(code), texts);
+        collect(tokenize(readFile(entry.path())), texts);
     }
     return texts;
 }

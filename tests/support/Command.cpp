@@ -4,6 +4,7 @@
 #include <array>
 #include <cerrno>
 #include <csignal>
+#include <stdexcept>
 #include <system_error>
 #include <utility>
 
@@ -303,6 +304,17 @@ CommandResult Command::run() const
     result.output = output.read();
     result.errors = errors.read();
     return result;
+}
+
+std::string Command::runOrThrow() const
+{
+    CommandResult result = run();
+    if (!result.succeeded())
+    {
+        throw std::runtime_error(text() + ": exit status " + std::to_string(result.exitStatus) +
+                                 "\n" + result.errors);
+    }
+    return std::move(result.output);
 }
 
 } // namespace vclink::test

@@ -50,6 +50,10 @@ class Command
     /// killed. May be called again.
     /// @throws std::system_error when the program can't be started or watched
     CommandResult run() const;
+    /// As run(), for a program that has to succeed.
+    /// @return what it wrote to standard output
+    /// @throws std::runtime_error with its words when it fails
+    std::string runOrThrow() const;
 
     /// The arguments separated by blanks, for messages.
     std::string text() const;

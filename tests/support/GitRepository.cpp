@@ -14,17 +14,6 @@ namespace vclink::test
 namespace
 {
 
-std::string runOrThrow(const Command &command)
-{
-    auto result = command.run();
-    if (!result.succeeded())
-    {
-        throw std::runtime_error(command.text() + ": exit status " +
-                                 std::to_string(result.exitStatus) + "\n" + result.errors);
-    }
-    return std::move(result.output);
-}
-
 Command makeCommand(const std::vector<std::string> &arguments)
 {
     // No maintenance process outlives the command, and local submodules may be cloned.
@@ -39,7 +28,7 @@ Command makeCommand(const std::vector<std::string> &arguments)
     return Command(std::move(all));
 }
 
-std::string readFile(const std::filesystem::path &file)
+std::string readOrThrow(const std::filesystem::path &file)
 {
     std::ifstream stream(file, std::ios::binary);
     if (!stream)
@@ -73,10 +62,11 @@ NewRepository askGitForNewRepository()
 {
     namespace fs = std::filesystem;
     const TemporaryFolder folder;
-    runOrThrow(makeCommand({"init", "--quiet", "--template=", "--initial-branch=main", "."})
-                   .in(folder.path())
-                   .environment("HOME", folder.path())
-                   .environment("XDG_CONFIG_HOME", folder.path()));
+    makeCommand({"init", "--quiet", "--template=", "--initial-branch=main", "."})
+        .in(folder.path())
+        .environment("HOME", folder.path())
+        .environment("XDG_CONFIG_HOME", folder.path())
+        .runOrThrow();
     NewRepository made;
     for (const auto &entry : fs::recursive_directory_iterator(folder.path()))
     {
@@ -84,7 +74,7 @@ NewRepository askGitForNewRepository()
         if (entry.is_directory())
             made.folders.push_back(name);
         else
-            made.files.emplace(name, readFile(entry.path()));
+            made.files.emplace(name, readOrThrow(entry.path()));
     }
     return made;
 }
@@ -96,9 +86,9 @@ std::string idOfNewCommit(const GitRepository &repository)
     const auto folder = repository / ".git";
     if (!std::filesystem::is_directory(folder))
         return repository.line({"rev-parse", "HEAD"});
-    std::string text = withoutLineFeed(readFile(folder / "HEAD"));
+    std::string text = withoutLineFeed(readOrThrow(folder / "HEAD"));
     if (text.compare(0, beginning.size(), beginning) == 0)
-        text = withoutLineFeed(readFile(folder / text.substr(beginning.size())));
+        text = withoutLineFeed(readOrThrow(folder / text.substr(beginning.size())));
     return text;
 }
 
@@ -121,12 +111,20 @@ GitRepository GitRepository::init(const std::filesystem::path &folder)
 GitRepository GitRepository::clone(const std::filesystem::path &source,
                                    const std::filesystem::path &folder)
 {
-    runOrThrow(makeCommand({"clone", "--quiet", "--template=", source.string(), folder.string()}));
+    makeCommand({"clone", "--quiet", "--template=", source.string(), folder.string()}).runOrThrow();
     return GitRepository(folder);
 }
 
 GitRepository::GitRepository(std::filesystem::path folder) : path_(std::move(folder))
 {
+}
+
+GitRepository GitRepository::copyTo(const std::filesystem::path &folder) const
+{
+    namespace fs = std::filesystem;
+    fs::remove_all(folder);
+    fs::copy(path_, folder, fs::copy_options::recursive | fs::copy_options::copy_symlinks);
+    return GitRepository(folder);
 }
 
 void GitRepository::write(const std::string &name, const std::string &bytes) const
@@ -138,7 +136,7 @@ void GitRepository::write(const std::string &name, const std::string &bytes) con
 
 std::string GitRepository::read(const std::string &name) const
 {
-    return readFile(path_ / name);
+    return readOrThrow(path_ / name);
 }
 
 void GitRepository::makeFolder(const std::string &name) const
@@ -179,11 +177,12 @@ void GitRepository::add(const std::vector<std::string> &names) const
 std::string GitRepository::commit(const std::string &message)
 {
     const std::string date = std::to_string(1'577'836'800 + 60 * commits_++) + " +0000";
-    runOrThrow(command({"-c", "user.name=Test Author", "-c", "user.email=author@example.com",
-                        "commit", "--quiet", "--allow-empty", "--allow-empty-message",
-                        "--no-verify", "--message", message})
-                   .environment("GIT_AUTHOR_DATE", date)
-                   .environment("GIT_COMMITTER_DATE", date));
+    command({"-c", "user.name=Test Author", "-c", "user.email=author@example.com", "commit",
+             "--quiet", "--allow-empty", "--allow-empty-message", "--no-verify", "--message",
+             message})
+        .environment("GIT_AUTHOR_DATE", date)
+        .environment("GIT_COMMITTER_DATE", date)
+        .runOrThrow();
     return idOfNewCommit(*this);
 }
 
@@ -211,7 +210,7 @@ void GitRepository::makeBranch(const std::string &name,
 
 std::string GitRepository::git(const std::vector<std::string> &arguments) const
 {
-    return runOrThrow(command(arguments));
+    return command(arguments).runOrThrow();
 }
 
 std::string GitRepository::line(const std::vector<std::string> &arguments) const

@@ -34,6 +34,9 @@ class GitRepository
         return path_ / name;
     }
 
+    /// Copies the working copy with all it holds, in place of what is there.
+    GitRepository copyTo(const std::filesystem::path &folder) const;
+
     /// Writes a whole file, and makes the folders above it.
     void write(const std::string &name, const std::string &bytes) const;
     std::string read(const std::string &name) const;

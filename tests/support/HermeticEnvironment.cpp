@@ -8,6 +8,7 @@
 #include <unistd.h>
 
 #include "support/interposition.hpp"
+#include "support/strings.hpp"
 
 namespace vclink::test
 {
@@ -36,11 +37,6 @@ void replaceEnvironment(const std::vector<std::string> &variables)
         if (separator != std::string::npos)
             setVariable(variable.substr(0, separator), variable.substr(separator + 1));
     }
-}
-
-bool startsWith(const std::string &text, const std::string &beginning)
-{
-    return text.compare(0, beginning.size(), beginning) == 0;
 }
 
 /// Whether a variable says something about the person, the language or the network.

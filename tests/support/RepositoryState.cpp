@@ -3,9 +3,7 @@
 
 #include <array>
 #include <cerrno>
-#include <fstream>
 #include <functional>
-#include <iterator>
 #include <ostream>
 #include <sstream>
 #include <system_error>
@@ -13,6 +11,9 @@
 
 #include <gtest/gtest.h>
 #include <sys/stat.h>
+
+#include "support/readFile.hpp"
+#include "support/strings.hpp"
 
 namespace vclink::test
 {
@@ -25,12 +26,6 @@ constexpr std::array filesUnderWay{"MERGE_HEAD",       "MERGE_MSG",   "MERGE_MOD
                                    "CHERRY_PICK_HEAD", "REVERT_HEAD", "BISECT_LOG",
                                    "ORIG_HEAD",        "index.lock",  "HEAD.lock"};
 constexpr std::size_t longestContent = 120;
-
-std::string readIfPossible(const fs::path &file)
-{
-    std::ifstream stream(file, std::ios::binary);
-    return {std::istreambuf_iterator<char>(stream), {}};
-}
 
 std::string shortened(const std::string &bytes)
 {
@@ -55,7 +50,7 @@ std::string contentOf(const fs::directory_entry &entry)
     if (entry.is_other())
         text << "special file " << static_cast<int>(entry.status().type());
     else
-        text << (entry.is_directory() ? "folder" : shortened(readIfPossible(entry.path())));
+        text << (entry.is_directory() ? "folder" : shortened(readFile(entry.path())));
     return text.str();
 }
 
@@ -92,11 +87,11 @@ RepositoryState stateOf(const GitRepository &repository)
     state.head = repository.tryGit({"symbolic-ref", "--quiet", "HEAD"}).output +
                  repository.tryGit({"rev-parse", "--quiet", "--verify", "HEAD"}).output;
     state.references = repository.git({"for-each-ref", "--format=%(refname) %(objectname)"});
-    state.reflog = readIfPossible(folder / "logs/HEAD");
+    state.reflog = readFile(folder / "logs/HEAD");
     for (const auto *name : filesUnderWay)
     {
         if (fs::exists(folder / name))
-            state.underWay.emplace(name, readIfPossible(folder / name));
+            state.underWay.emplace(name, readFile(folder / name));
     }
     state.index = indexOf(repository);
     state.workingTree = workingTreeOf(repository);
@@ -106,8 +101,7 @@ RepositoryState stateOf(const GitRepository &repository)
 RepositoryState::Entries indexOf(const GitRepository &repository)
 {
     RepositoryState::Entries entries;
-    std::istringstream stream(repository.git({"ls-files", "-v", "--stage", "-z"}));
-    for (std::string record; std::getline(stream, record, '\0');)
+    for (const auto &record : split(repository.git({"ls-files", "-v", "--stage", "-z"}), '\0'))
     {
         const auto tab = record.find('\t');
         std::string &lines = entries[record.substr(tab + 1)];
@@ -166,7 +160,7 @@ FileStamp stampOf(const fs::path &file)
     }
     const bool isFile = S_ISREG(status.st_mode);
     return {status.st_ino, nanoseconds(status.st_mtim), nanoseconds(status.st_ctim),
-            isFile ? readIfPossible(file) : std::string()};
+            isFile ? readFile(file) : std::string()};
 }
 
 FileStamp indexStampOf(const GitRepository &repository)

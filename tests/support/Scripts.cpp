@@ -3,7 +3,6 @@
 
 #include <cerrno>
 #include <fstream>
-#include <iterator>
 #include <stdexcept>
 #include <system_error>
 #include <utility>
@@ -41,12 +40,6 @@ std::string Scripts::pipe()
     if (::mkfifo(path.c_str(), 0666) != 0)
         throw std::system_error(errno, std::generic_category(), "mkfifo");
     return path;
-}
-
-std::string Scripts::read(const std::filesystem::path &file)
-{
-    std::ifstream stream(file, std::ios::binary);
-    return {std::istreambuf_iterator<char>(stream), {}};
 }
 
 std::string Scripts::newPath()

@@ -26,9 +26,6 @@ class Scripts
     /// @return its path
     std::string pipe();
 
-    /// What a file of any path holds; empty when there is none.
-    static std::string read(const std::filesystem::path &file);
-
     const std::filesystem::path &folder() const noexcept
     {
         return folder_;

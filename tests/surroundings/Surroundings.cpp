@@ -11,9 +11,8 @@
 #include <gtest/gtest.h>
 
 #include "support/ChildProcess.hpp"
-#include "support/TestInteractor.hpp"
+#include "support/adapterFor.hpp"
 #include "support/text.hpp"
-#include "vclink/git/GitAdapterFactory.hpp"
 
 namespace vclink::test
 {
@@ -215,9 +214,7 @@ std::string Surroundings::outcomeByLibrary(const Cell &cell, const fs::path &cop
     {
         try
         {
-            const auto adapter = git::GitAdapterFactory().createAdapterFor(
-                asPath(copy.string()), std::make_shared<TestInteractor>());
-            cell.byLibrary(*adapter, copy);
+            cell.byLibrary(*adapterFor(GitRepository(copy)), copy);
             return {};
         }
         catch (const std::exception &exception)

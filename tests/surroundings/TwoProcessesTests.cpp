@@ -1,7 +1,6 @@
 // SPDX-License-Identifier: MIT
 #include <algorithm>
 #include <chrono>
-#include <cstdlib>
 #include <exception>
 #include <filesystem>
 #include <fstream>
@@ -20,39 +19,31 @@
 #include "differential/Snapshot.hpp"
 #include "support/GitFixture.hpp"
 #include "support/LibGit2Session.hpp"
-#include "support/TestInteractor.hpp"
+#include "support/adapterFor.hpp"
+#include "support/numberFrom.hpp"
 #include "support/text.hpp"
 #include "vclink/git/BranchManager.hpp"
 #include "vclink/git/BranchParameters.hpp"
-#include "vclink/git/GitAdapterFactory.hpp"
 
 namespace
 {
 
 namespace fs = std::filesystem;
 namespace git = vclink::git;
-using vclink::test::asPath;
 using vclink::test::asPaths;
 using vclink::test::blobIdOf;
 using vclink::test::GitRepository;
+using vclink::test::numberFrom;
 using vclink::test::Peer;
 
 constexpr int filesInFolder = 30;
 const std::string work = "the work of the user\n";
 
-std::uint64_t numberFrom(const char *variable, std::uint64_t otherwise)
-{
-    const char *const text = std::getenv(variable);
-    return text == nullptr ? otherwise : std::stoull(text);
-}
-
 /// The library in one working copy.
 struct Library
 {
     explicit Library(const GitRepository &repository)
-        : copy(repository),
-          adapter(git::GitAdapterFactory().createAdapterFor(
-              asPath(repository.path()), std::make_shared<vclink::test::TestInteractor>())),
+        : copy(repository), adapter(vclink::test::adapterFor(repository)),
           branches(git::BranchManager::create(*adapter))
     {
     }

@@ -1,8 +1,6 @@
 // SPDX-License-Identifier: MIT
 #include "imports.hpp"
 
-#include <stdexcept>
-
 #include "differential/quoting.hpp"
 
 namespace vclink::test
@@ -39,11 +37,9 @@ std::string commitOf(const std::string &branch, const Files &files)
 void importCommits(const GitRepository &copy, const std::string &stream)
 {
     copy.git({"config", "core.logAllRefUpdates", "false"});
-    const auto import =
-        copy.command({"-c", "fastimport.unpackLimit=1", "fast-import", "--quiet"}).input(stream);
-    const auto result = import.run();
-    if (!result.succeeded())
-        throw std::runtime_error(import.text() + ": " + result.errors);
+    copy.command({"-c", "fastimport.unpackLimit=1", "fast-import", "--quiet"})
+        .input(stream)
+        .runOrThrow();
     copy.git({"pack-refs", "--all"});
     copy.git({"reset", "--quiet", "--hard"});
     copy.write(".git/info/exclude", "");

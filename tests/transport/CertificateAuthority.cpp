@@ -5,7 +5,7 @@
 #include <utility>
 #include <vector>
 
-#include "run.hpp"
+#include "support/Command.hpp"
 
 namespace vclink::test
 {
@@ -37,7 +37,7 @@ const char *const configuration = "[ca]\n"
 void openssl(const fs::path &folder, std::vector<std::string> arguments)
 {
     arguments.insert(arguments.begin(), "openssl");
-    runOrThrow(Command(std::move(arguments)).in(folder));
+    Command(std::move(arguments)).in(folder).runOrThrow();
 }
 
 /// A request or, with "-x509", a certificate that signs itself, and its key.

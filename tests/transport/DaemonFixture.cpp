@@ -5,43 +5,12 @@
 
 namespace vclink::test
 {
-namespace
-{
-
-std::unique_ptr<GitDaemon> &runningDaemon()
-{
-    static std::unique_ptr<GitDaemon> daemon;
-    return daemon;
-}
-
-} // namespace
-
-RunningDaemon::RunningDaemon()
-{
-    if (!runningDaemon())
-        runningDaemon() = std::make_unique<GitDaemon>();
-}
-
-GitDaemon &RunningDaemon::server()
-{
-    return *runningDaemon();
-}
-
-void RunningDaemon::stopServer()
-{
-    runningDaemon().reset();
-}
 
 DaemonFixture::DaemonFixture()
 {
     commit_ = commitNoise(source_, 1);
     source_.git({"branch", "other", commit_});
     source_.git({"push", "--quiet", served_.path(), "--all"});
-}
-
-void DaemonFixture::TearDownTestSuite()
-{
-    stopServer();
 }
 
 std::string DaemonFixture::urlAt(std::uint16_t port) const

@@ -1,36 +1,26 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
-#include <memory>
 #include <string>
 
 #include "GitDaemon.hpp"
 #include "RemoteFixture.hpp"
+#include "ServerOfTheSuite.hpp"
 
 namespace vclink::test
 {
 
-/// Has the daemon of the suite running before the test's environment is made.
-class RunningDaemon
-{
-  protected:
-    RunningDaemon();
-
-    static GitDaemon &server();
-    static void stopServer();
-};
-
 /// Base of the fixtures that need one real server. It has a repository with files that take some
 /// time to transfer.
-class DaemonFixture : public RunningDaemon, public RemoteFixture
+class DaemonFixture : public ServerOfTheSuite<GitDaemon>, public RemoteFixture
 {
   protected:
     static constexpr int fileCount = 100;
     /// What a clone transfers at least; the files hold noise, which can't be packed.
     static constexpr std::size_t size = 1'000'000;
 
+    using ServerOfTheSuite<GitDaemon>::TearDownTestSuite;
     DaemonFixture();
-    static void TearDownTestSuite();
 
     /// The repository's address at another port.
     std::string urlAt(std::uint16_t port) const;

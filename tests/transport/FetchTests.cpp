@@ -142,9 +142,7 @@ TEST_P(Fetch, TakesAThousandCommits)
                    (i == 1 ? "from " + tip + "\n" : "") + "M 644 inline file\ndata <<END\n" +
                    std::to_string(i) + "\nEND\n\n";
     }
-    const auto imported =
-        source_.command({"fast-import", "--quiet"}).input(commits + "done\n").run();
-    ASSERT_TRUE(imported.succeeded()) << imported.errors;
+    source_.command({"fast-import", "--quiet"}).input(commits + "done\n").runOrThrow();
     publish({"many"});
     fetchBoth();
     EXPECT_EQ(fetched_.line({"rev-list", "--count", "refs/remotes/origin/many"}), "1002");

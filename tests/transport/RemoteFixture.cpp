@@ -3,6 +3,7 @@
 
 #include <utility>
 
+#include "support/adapterFor.hpp"
 #include "support/text.hpp"
 #include "vclink/git/GitAdapterFactory.hpp"
 
@@ -33,7 +34,7 @@ std::unique_ptr<WorkingCopyGenerator> RemoteFixture::makeGenerator() const
 
 std::unique_ptr<CMAdapter> RemoteFixture::makeAdapter(const GitRepository &repository) const
 {
-    return git::GitAdapterFactory().createAdapterFor(asPath(repository.path()), interactor_);
+    return adapterFor(repository, interactor_);
 }
 
 GitRepository RemoteFixture::clone(const std::string &url, const std::string &name) const

@@ -6,8 +6,6 @@
 #include <chrono>
 #include <csignal>
 #include <cstdlib>
-#include <fstream>
-#include <iterator>
 #include <sstream>
 #include <stdexcept>
 #include <system_error>
@@ -22,6 +20,7 @@
 #include <unistd.h>
 
 #include "listening.hpp"
+#include "support/readFile.hpp"
 
 namespace vclink::test
 {
@@ -171,8 +170,7 @@ bool ServerProcess::hasEnded() const
 
 std::string ServerProcess::log() const
 {
-    std::ifstream stream(log_, std::ios::binary);
-    return {std::istreambuf_iterator<char>(stream), {}};
+    return readFile(log_);
 }
 
 bool ServerProcess::waitUntil(const std::function<bool()> &ready) const

@@ -3,7 +3,6 @@
 
 #include <stdexcept>
 
-#include "run.hpp"
 #include "support/Command.hpp"
 
 namespace vclink::test
@@ -11,7 +10,7 @@ namespace vclink::test
 
 void makeSshKey(const std::filesystem::path &file)
 {
-    runOrThrow(Command({"ssh-keygen", "-q", "-t", "ed25519", "-N", "", "-C", "test", "-f", file}));
+    Command({"ssh-keygen", "-q", "-t", "ed25519", "-N", "", "-C", "test", "-f", file}).runOrThrow();
 }
 
 SshAgent::SshAgent() : process_({"ssh-agent", "-D", "-a", folder_ / "agent"}, folder_.path())
@@ -28,7 +27,7 @@ SshAgent::SshAgent() : process_({"ssh-agent", "-D", "-a", folder_ / "agent"}, fo
 
 void SshAgent::add(const std::filesystem::path &key) const
 {
-    runOrThrow(Command({"ssh-add", "-q", key}).environment("SSH_AUTH_SOCK", socket()));
+    Command({"ssh-add", "-q", key}).environment("SSH_AUTH_SOCK", socket()).runOrThrow();
 }
 
 } // namespace vclink::test

@@ -3,7 +3,6 @@
 #include <cstdlib>
 #include <filesystem>
 #include <iostream>
-#include <memory>
 #include <string>
 
 #include <gmock/gmock.h>
@@ -12,6 +11,7 @@
 #include <git2/errors.h>
 
 #include "RemoteFixture.hpp"
+#include "ServerOfTheSuite.hpp"
 #include "SshAgent.hpp"
 #include "SshServer.hpp"
 #include "error/logging/severity.hpp"
@@ -31,36 +31,17 @@ using vclink::test::SshAgent;
 using vclink::test::SshServer;
 namespace libgit2_release = vclink::test::libgit2_release;
 
-/// Has the server of the suite running before the test's environment is made.
-class RunningSshServer
-{
-  protected:
-    RunningSshServer()
-    {
-        if (!running)
-            running = std::make_unique<SshServer>();
-    }
-    static SshServer &server()
-    {
-        return *running;
-    }
-    static std::unique_ptr<SshServer> running;
-};
-std::unique_ptr<SshServer> RunningSshServer::running;
-
 /// A repository with one commit, on a server that lets one key in.
-class SshCredentials : public RunningSshServer, public vclink::test::RemoteFixture
+class SshCredentials : public vclink::test::ServerOfTheSuite<SshServer>,
+                       public vclink::test::RemoteFixture
 {
   protected:
+    using ServerOfTheSuite<SshServer>::TearDownTestSuite;
     SshCredentials()
     {
         auto source = makeRepository("source");
         commit_ = source.commit("first");
         source.git({"push", "--quiet", served_.path(), "HEAD:refs/heads/main"});
-    }
-    static void TearDownTestSuite()
-    {
-        running.reset();
     }
 
     static void useAgent(const std::string &socket)

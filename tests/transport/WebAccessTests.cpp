@@ -1,7 +1,6 @@
 // SPDX-License-Identifier: MIT
 #include <algorithm>
 #include <iostream>
-#include <memory>
 #include <string>
 #include <vector>
 
@@ -11,6 +10,7 @@
 #include <git2.h>
 
 #include "RemoteFixture.hpp"
+#include "ServerOfTheSuite.hpp"
 #include "WebServer.hpp"
 #include "error/logging/severity.hpp"
 #include "support/LogCapture.hpp"
@@ -23,35 +23,15 @@ using vclink::test::LogCapture;
 using vclink::test::WebServer;
 using Site = vclink::test::WebServer::Site;
 
-/// Has the server of the suites running before the test's environment is made.
-class RunningWebServer
+class WebTest : public vclink::test::ServerOfTheSuite<WebServer>, public vclink::test::RemoteFixture
 {
   protected:
-    RunningWebServer()
-    {
-        if (!running)
-            running = std::make_unique<WebServer>(Site::Https);
-    }
-    static WebServer &server()
-    {
-        return *running;
-    }
-    static std::unique_ptr<WebServer> running;
-};
-std::unique_ptr<WebServer> RunningWebServer::running;
-
-class WebTest : public RunningWebServer, public vclink::test::RemoteFixture
-{
-  protected:
+    using ServerOfTheSuite<WebServer>::TearDownTestSuite;
     WebTest()
     {
         auto source = makeRepository("source");
         commit_ = source.commit("first");
         source.git({"push", "--quiet", served_.path(), "HEAD:refs/heads/main"});
-    }
-    static void TearDownTestSuite()
-    {
-        running.reset();
     }
 
     GitRepository served_ = server().makeRepository();

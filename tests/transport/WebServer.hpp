@@ -32,7 +32,7 @@ class WebServer : public GitServer
     };
 
     /// @param site the one that base() and url() mean
-    explicit WebServer(Site site);
+    explicit WebServer(Site site = Site::Https);
 
     std::string base() const override;
     std::string base(Site site) const;

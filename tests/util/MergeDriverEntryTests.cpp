@@ -25,6 +25,7 @@
 #include "support/NothingLeft.hpp"
 #include "support/Scripts.hpp"
 #include "support/libgit2/LibGit2Recorder.hpp"
+#include "support/readFile.hpp"
 #include "util/GitMergeDriverLookup.hpp"
 #include "vclink/git/LibGit2Guard.hpp"
 
@@ -242,7 +243,7 @@ TEST_F(MergeDriverEntry, WritesTheMarkerSizeInDecimal)
     {
         source_.options.marker_size = size;
         EXPECT_EQ(apply().code, 0);
-        EXPECT_EQ(Scripts::read(out), std::to_string(size) + '\n');
+        EXPECT_EQ(readFile(out), std::to_string(size) + '\n');
     }
 }
 
@@ -265,7 +266,7 @@ TEST_F(MergeDriverEntry, ChoosesPathAndModeEachByItself)
     EXPECT_EQ(pathFor("file", "File", "other"), "File");
     EXPECT_EQ(pathFor("file", "file", "file"), "file");
     EXPECT_EQ(pathFor("file", "file", "sub/\xC3\xA9"), "sub/\xC3\xA9");
-    EXPECT_EQ(Scripts::read(out), "sub/\xC3\xA9");
+    EXPECT_EQ(readFile(out), "sub/\xC3\xA9");
     const auto modeFor = [this](std::uint32_t ancestor, std::uint32_t ours, std::uint32_t theirs)
     {
         ancestor_.mode = ancestor;

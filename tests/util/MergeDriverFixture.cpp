@@ -2,11 +2,11 @@
 #include "MergeDriverFixture.hpp"
 
 #include <filesystem>
-#include <sstream>
 
 #include <git2.h>
 
 #include "error/errorUtil/GitResult.hpp"
+#include "support/strings.hpp"
 
 namespace vclink::test
 {
@@ -102,12 +102,7 @@ void MergeDriverFixture::mergeOrThrow() const
 
 std::vector<std::string> MergeDriverFixture::index() const
 {
-    std::vector<std::string> entries;
-    std::istringstream lines(
-        repository_.git({"ls-files", "--format=%(objectmode)%x09%(stage)%x09%(path)"}));
-    for (std::string line; std::getline(lines, line);)
-        entries.push_back(line);
-    return entries;
+    return split(repository_.git({"ls-files", "--format=%(objectmode)%x09%(stage)%x09%(path)"}));
 }
 
 std::string MergeDriverFixture::staged(const std::string &name, int stage) const

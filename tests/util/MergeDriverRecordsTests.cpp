@@ -8,6 +8,7 @@
 #include <gtest/gtest.h>
 
 #include "MergeDriverFixture.hpp"
+#include "support/readFile.hpp"
 
 namespace
 {
@@ -46,7 +47,7 @@ TEST_F(MergeDriverRecords, TellOfASuccess)
                        "until grep -q '^State:.S' /proc/$PPID/status; do :; done");
     define("tool", program + " %A %B %O %L %P");
     const auto records = allRecords();
-    std::string expanded = program + ' ' + Scripts::read(names);
+    std::string expanded = program + ' ' + readFile(names);
     expanded.pop_back();
     EXPECT_THAT(records, ElementsAre("32 " + signature, "2  filter_name=tool",
                                      "8 merge.tool.driver " + program + " %A %B %O %L %P",
@@ -150,7 +151,7 @@ TEST_F(MergeDriverRecords, TellOfTemporaryFilesThatCannotBeRemovedTheLastOneFirs
         EXPECT_THAT(texts[i + 1], StartsWith(beginning));
         told += texts[i + 1].substr(beginning.size()) + '\n';
     }
-    EXPECT_EQ(told, Scripts::read(names));
+    EXPECT_EQ(told, readFile(names));
     EXPECT_TRUE(isInConflict("file"));
 }
 

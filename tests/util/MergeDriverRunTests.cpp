@@ -11,6 +11,7 @@
 #include <gtest/gtest.h>
 
 #include "MergeDriverFixture.hpp"
+#include "support/readFile.hpp"
 
 namespace
 {
@@ -18,6 +19,7 @@ namespace
 using testing::ElementsAre;
 using testing::HasSubstr;
 using testing::Not;
+using vclink::test::readFile;
 using vclink::test::Scripts;
 
 using MergeDriverRun = vclink::test::MergeDriverFixture;
@@ -41,7 +43,7 @@ TEST_F(MergeDriverRun, GivesTemporaryFilesNamesWithoutTheFilesOwn)
     makeConflict();
     define("tool", scripts_.shell("printf '%s\\n' \"$@\" >" + out) + " %O %A %B");
     EXPECT_EQ(merge(), 0);
-    std::istringstream arguments(Scripts::read(out));
+    std::istringstream arguments(readFile(out));
     std::size_t count = 0;
     for (std::string argument; std::getline(arguments, argument); ++count)
     {
@@ -62,7 +64,7 @@ TEST_F(MergeDriverRun, FindsAPlaceholderInTheNameOfTheTemporaryFolder)
     makeConflict();
     define("tool", scripts_.shell("echo \"$1\" >" + out) + " %A");
     EXPECT_EQ(merge(), 0);
-    EXPECT_THAT(Scripts::read(out), testing::StartsWith(folder() / "afileb/"));
+    EXPECT_THAT(readFile(out), testing::StartsWith(folder() / "afileb/"));
 }
 
 TEST_F(MergeDriverRun, IsNotAskedForLibGit2sOwnDrivers)
@@ -82,7 +84,7 @@ TEST_F(MergeDriverRun, IsNotAskedForLibGit2sOwnDrivers)
         const bool asked = std::string(attribute) == "text";
         EXPECT_THAT(log.messages(), testing::SizeIs(asked ? 1 : 0));
     }
-    EXPECT_EQ(Scripts::read(mark), "");
+    EXPECT_EQ(readFile(mark), "");
 }
 
 TEST_F(MergeDriverRun, IsNotAskedForAFileThatBothHaveMovedAlike)
@@ -106,7 +108,7 @@ TEST_F(MergeDriverRun, IsNotAskedForAFileThatBothHaveMovedAlike)
     EXPECT_EQ(merge(), 0);
     EXPECT_THAT(index(), ElementsAre("100644\t0\t.gitattributes", "100644\t1\tfile",
                                      "100644\t2\tnew", "100644\t3\tnew"));
-    EXPECT_EQ(Scripts::read(mark), "");
+    EXPECT_EQ(readFile(mark), "");
 }
 
 TEST_F(MergeDriverRun, RunsOnceForEachFileOneAfterTheOther)
@@ -116,7 +118,7 @@ TEST_F(MergeDriverRun, RunsOnceForEachFileOneAfterTheOther)
     defineScript("tool", "echo \"begin $5\" >>" + out + "; test \"$5\" = b || echo \"$5\" >\"$2\"" +
                              "; echo \"end $5\" >>" + out + "; test \"$5\" != b");
     EXPECT_EQ(merge(), 0);
-    EXPECT_EQ(Scripts::read(out), "begin a\nend a\nbegin b\nend b\nbegin c\nend c\n");
+    EXPECT_EQ(readFile(out), "begin a\nend a\nbegin b\nend b\nbegin c\nend c\n");
     EXPECT_EQ(staged("a"), "a\n");
     EXPECT_TRUE(isInConflict("b"));
     EXPECT_EQ(staged("c"), "c\n");

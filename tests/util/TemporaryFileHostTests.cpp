@@ -14,6 +14,7 @@
 #include "support/GitFixture.hpp"
 #include "support/Scripts.hpp"
 #include "support/interposition.hpp"
+#include "support/readFile.hpp"
 #include "support/text.hpp"
 #include "util/temporaryFile.hpp"
 
@@ -72,6 +73,7 @@ namespace fs = std::filesystem;
 namespace git = vclink::git;
 using testing::IsEmpty;
 using vclink::test::asBytes;
+using vclink::test::readFile;
 using vclink::test::Scripts;
 
 class TemporaryFileHost : public vclink::test::GitFixture
@@ -94,7 +96,7 @@ class TemporaryFileHost : public vclink::test::GitFixture
     }
     std::string read(const std::string &name) const
     {
-        return Scripts::read(folder() / name);
+        return readFile(folder() / name);
     }
 
     vclink::test::GitRepository files_{folder().path()};

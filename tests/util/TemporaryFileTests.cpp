@@ -18,8 +18,8 @@
 #include "support/LibGit2Session.hpp"
 #include "support/LogCapture.hpp"
 #include "support/NothingLeft.hpp"
-#include "support/Scripts.hpp"
 #include "support/SignalAction.hpp"
+#include "support/readFile.hpp"
 #include "support/text.hpp"
 #include "util/temporaryFile.hpp"
 
@@ -48,7 +48,7 @@ TEST_F(TemporaryFile, HoldsTheBytesInTheTemporaryFolderUnderANewNameForItsOwnerA
                                      std::string("\0\377\n", 3), std::string(1'000'000, 'x')})
     {
         const fs::path file = write(bytes);
-        EXPECT_EQ(Scripts::read(file), bytes);
+        EXPECT_EQ(readFile(file), bytes);
         EXPECT_EQ(file.parent_path(), environment().temporary());
         EXPECT_EQ(file.extension(), "");
         EXPECT_EQ(fs::status(file).permissions(), fs::perms(0600));
@@ -88,7 +88,7 @@ TEST_F(TemporaryFile, HoldsABlobAndIsNotMadeForOneThatIsMissing)
     git_index_entry entry = {};
     git_oid_fromstr(&entry.id, repository.line({"rev-parse", "HEAD:file"}).c_str());
     const upath file = git::writeBlobToTemporaryFile(entry, opened.get());
-    EXPECT_EQ(Scripts::read(asBytes(file)), std::string("a\r\n\0b", 5));
+    EXPECT_EQ(readFile(asBytes(file)), std::string("a\r\n\0b", 5));
     git::removeTemporaryFile(file);
     const NothingLeft check(environment().temporary());
     git_oid_fromstr(&entry.id, std::string(40, '1').c_str());

@@ -8,8 +8,8 @@
 
 #include "fl/filesystem/path.hpp"
 #include "fl/i18n/convert.hpp"
-#include "support/Scripts.hpp"
 #include "support/TemporaryFolder.hpp"
+#include "support/readFile.hpp"
 
 namespace vclink_host_tests
 {
@@ -36,7 +36,7 @@ class Folder : public vclink::test::TemporaryFolder
     }
     std::string read(const std::string &name) const
     {
-        return vclink::test::Scripts::read(path() / name);
+        return vclink::test::readFile(path() / name);
     }
 };
 

@@ -1,8 +1,6 @@
 // SPDX-License-Identifier: MIT
 #include "BranchFixture.hpp"
 
-#include <sstream>
-
 #include "fl/i18n/MessageCatalog.hpp"
 #include "fl/i18n/VkLocale.hpp"
 #include "support/text.hpp"
@@ -35,22 +33,13 @@ std::string BranchFixture::idOf(const std::string &revision) const
 
 std::string BranchFixture::currentBranch() const
 {
-    auto lines = splitLines(repository_.tryGit({"symbolic-ref", "--quiet", "HEAD"}).output);
+    auto lines = split(repository_.tryGit({"symbolic-ref", "--quiet", "HEAD"}).output);
     return lines.empty() ? std::string() : lines.front();
 }
 
 std::vector<std::string> BranchFixture::status() const
 {
-    return splitLines(repository_.git({"status", "--porcelain", "-uall"}));
-}
-
-std::vector<std::string> splitLines(const std::string &text)
-{
-    std::istringstream stream(text);
-    std::vector<std::string> lines;
-    for (std::string line; std::getline(stream, line);)
-        lines.push_back(line);
-    return lines;
+    return split(repository_.git({"status", "--porcelain", "-uall"}));
 }
 
 std::vector<std::string> namesOf(const std::vector<git::BranchPointer> &branches)

@@ -10,6 +10,7 @@
 #include "support/Change.hpp"
 #include "support/Failure.hpp"
 #include "support/RepositoryState.hpp"
+#include "support/strings.hpp"
 #include "vclink/git/BranchManager.hpp"
 
 namespace vclink::test
@@ -51,8 +52,6 @@ class BranchFixture : public AdapterFixture
     const std::unique_ptr<git::BranchManager> manager_ = git::BranchManager::create(*adapter_);
 };
 
-/// Lines of a text, without their line feeds.
-std::vector<std::string> splitLines(const std::string &text);
 std::vector<std::string> namesOf(const std::vector<git::BranchPointer> &branches);
 
 } // namespace vclink::test

@@ -29,7 +29,7 @@ class BranchLists : public BranchFixture
     }
     std::vector<std::string> byGit(const std::string &below) const
     {
-        return splitLines(repository_.git({"for-each-ref", "--format=%(refname)", below}));
+        return split(repository_.git({"for-each-ref", "--format=%(refname)", below}));
     }
 };
 

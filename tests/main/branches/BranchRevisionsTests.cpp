@@ -127,7 +127,7 @@ TEST_F(BranchRevisions, ThatMeanSeveralObjectsFail)
     for (int i = 0; i < 1000; ++i)
         repository_.write("file" + std::to_string(i), "content " + std::to_string(i));
     repository_.add();
-    const auto lines = splitLines(repository_.git({"ls-files", "--format=%(objectname)"}));
+    const auto lines = split(repository_.git({"ls-files", "--format=%(objectname)"}));
     std::set<std::string> beginnings;
     std::string common;
     for (const auto &id : lines)

@@ -106,7 +106,7 @@ class LockedReference : public MergeFixture, public testing::WithParamInterface<
     }
     std::vector<std::string> reflogOf(const std::string &reference) const
     {
-        return splitLines(repository_.tryGit({"reflog", "show", reference}).output);
+        return split(repository_.tryGit({"reflog", "show", reference}).output);
     }
 };
 
@@ -134,7 +134,7 @@ TEST_P(LockedReference, IsWaitedFor)
               twin.git({"for-each-ref", "--format=%(refname) %(tree)"}));
     EXPECT_EQ(repository_.read(".git/HEAD"), twin.read(".git/HEAD"));
     EXPECT_LE(reflogOf("HEAD").size(), before + 1);
-    EXPECT_EQ(reflogOf("HEAD").size(), splitLines(twin.git({"reflog", "show", "HEAD"})).size());
+    EXPECT_EQ(reflogOf("HEAD").size(), split(twin.git({"reflog", "show", "HEAD"})).size());
 }
 
 TEST_P(LockedReference, FailsOnceTheTimeIsOver)

@@ -30,10 +30,7 @@ class SwitchBranchFixture : public BranchFixture
     /// What `git checkout` makes of a copy of the working copy as it is now.
     RepositoryState stateAfterGit(const std::string &name) const
     {
-        const GitRepository twin(folder() / "twin");
-        std::filesystem::copy(repository_.path(), twin.path(),
-                              std::filesystem::copy_options::recursive |
-                                  std::filesystem::copy_options::copy_symlinks);
+        const GitRepository twin = repository_.copyTo(folder() / "twin");
         twin.git({"checkout", "--quiet", name});
         RepositoryState state = stateOf(twin);
         std::filesystem::remove_all(twin.path());

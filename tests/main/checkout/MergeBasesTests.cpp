@@ -60,7 +60,7 @@ class MergeBases : public ObstacleFixture
 
 TEST_F(MergeBases, AreAllLookedAt)
 {
-    ASSERT_EQ(splitLines(repository_.git({"merge-base", "--all", "main", "topic"})).size(), 2U);
+    ASSERT_EQ(split(repository_.git({"merge-base", "--all", "main", "topic"})).size(), 2U);
     expectEachRefused({{writes("d/p", "mine\n"), inTheWay("untracked file 'd/p'")},
                        {writes("d/q", "mine\n"), inTheWay("untracked file 'd/q'")}});
     expectConflicts("topic");

@@ -36,7 +36,7 @@ class TreeChanges : public BranchFixture
     /// "letter path", as git reports it without renames.
     std::vector<std::string> byGit(const std::string &before, const std::string &after) const
     {
-        std::vector<std::string> lines = splitLines(
+        std::vector<std::string> lines = split(
             repository_.git({"diff-tree", "-r", "--no-renames", "--name-status", before, after}));
         for (auto &line : lines)
             line[1] = ' ';

@@ -62,7 +62,7 @@ TEST_F(WorkingCopies, FindTheEntriesThatTheIndexHas)
         .input("100644 " + id + " 2\td/in-conflict\n")
         .run();
     const std::string listed = repository_.git({"ls-files"});
-    std::vector<std::string> names = splitLines(listed);
+    std::vector<std::string> names = split(listed);
     names.insert(names.end(), {"", "a", "d", "d/", "d/10a", "d/99", "D/1", "zz"});
     const auto repository = git::openRepository(asPath(repository_.path()));
     const auto index = git::getRepositoryIndex(repository.get());

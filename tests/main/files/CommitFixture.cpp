@@ -1,8 +1,6 @@
 // SPDX-License-Identifier: MIT
 #include "CommitFixture.hpp"
 
-#include <sstream>
-
 #include "support/UnprivilegedUser.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
 
@@ -58,7 +56,7 @@ std::string CommitFixture::commitAsItsOwner() const
 
 std::vector<std::string> CommitFixture::namesIn(const std::string &commit) const
 {
-    return linesOf(repository_.git({"ls-tree", "-r", "--name-only", commit}));
+    return split(repository_.git({"ls-tree", "-r", "--name-only", commit}));
 }
 
 std::string CommitFixture::committed(const std::string &name) const
@@ -68,21 +66,12 @@ std::string CommitFixture::committed(const std::string &name) const
 
 std::vector<std::string> CommitFixture::parents() const
 {
-    return linesOf(repository_.git({"rev-parse", "HEAD^@"}));
+    return split(repository_.git({"rev-parse", "HEAD^@"}));
 }
 
 std::string CommitFixture::idOf(const std::string &name) const
 {
     return repository_.line({"rev-parse", "--verify", name});
-}
-
-std::vector<std::string> linesOf(const std::string &text)
-{
-    std::istringstream stream(text);
-    std::vector<std::string> lines;
-    for (std::string line; std::getline(stream, line);)
-        lines.push_back(line);
-    return lines;
 }
 
 } // namespace vclink::test

@@ -5,6 +5,7 @@
 #include <vector>
 
 #include "StagingFixture.hpp"
+#include "support/strings.hpp"
 
 namespace vclink::test
 {
@@ -38,8 +39,5 @@ class CommitFixture : public StagingFixture
     std::vector<std::string> parents() const;
     std::string idOf(const std::string &name) const;
 };
-
-/// Lines of a text, without their line feeds.
-std::vector<std::string> linesOf(const std::string &text);
 
 } // namespace vclink::test

@@ -40,7 +40,7 @@ class SparseCommit : public CommitFixture
     /// `git ls-files -t`: "H" of a file that is checked out, "S" of one that is not.
     std::vector<std::string> entries() const
     {
-        return linesOf(repository_.git({"ls-files", "-t"}));
+        return split(repository_.git({"ls-files", "-t"}));
     }
     /// Begins a merge with a branch that changes these files, as ours does.
     void beginMergeOf(const std::vector<std::string> &ours, const std::vector<std::string> &theirs)
@@ -84,7 +84,7 @@ TEST_F(SparseCommit, KeepsWhatPatternsLeaveOut)
                                     "S out/one", "S sub/inside"));
     repository_.write("in/one", "changed\n");
     commit();
-    EXPECT_EQ(linesOf(repository_.git({"diff", "--name-status", "HEAD^", "HEAD"})),
+    EXPECT_EQ(split(repository_.git({"diff", "--name-status", "HEAD^", "HEAD"})),
               std::vector<std::string>{"M\tin/one"});
     EXPECT_EQ(entries(), before);
     EXPECT_THAT(status(), IsEmpty());
@@ -96,7 +96,7 @@ TEST_F(SparseCommit, DropsAFileThatIsDeletedBesideThem)
     repository_.remove("in/one");
     repository_.remove("file");
     commit();
-    EXPECT_EQ(linesOf(repository_.git({"diff", "--name-status", "HEAD^", "HEAD"})),
+    EXPECT_EQ(split(repository_.git({"diff", "--name-status", "HEAD^", "HEAD"})),
               (std::vector<std::string>{"D\tfile", "D\tin/one"}));
     EXPECT_THAT(entries(),
                 ElementsAre("H in/two", "H other", "S out/deep/two", "S out/one", "S sub/inside"));

@@ -33,7 +33,7 @@ class CommitMessage : public CommitFixture
         commit_->commit(upath(), message);
         const std::string bytes = repository_.git({"cat-file", "commit", "HEAD"});
         const auto endOfHeader = bytes.find("\n\n");
-        header_ = linesOf(bytes.substr(0, endOfHeader));
+        header_ = split(bytes.substr(0, endOfHeader));
         return endOfHeader == std::string::npos ? "no message" : bytes.substr(endOfHeader + 2);
     }
     std::unique_ptr<vclink::git::GitAdapter> commit_;

@@ -182,7 +182,7 @@ TEST_F(Commit, MovesTheBranchAndNothingElse)
     const std::string after = idOf("HEAD");
     EXPECT_THAT(parents(), ElementsAre(before));
     EXPECT_EQ(repository_.line({"symbolic-ref", "HEAD"}), "refs/heads/main");
-    EXPECT_THAT(linesOf(repository_.git({"for-each-ref", "--format=%(refname) %(objectname)"})),
+    EXPECT_THAT(split(repository_.git({"for-each-ref", "--format=%(refname) %(objectname)"})),
                 ElementsAre("refs/heads/another " + before, "refs/heads/main " + after,
                             "refs/tags/tag " + before));
     EXPECT_EQ(repository_.line({"log", "--walk-reflogs", "-1", "--format=%gs", "main"}),
@@ -268,7 +268,7 @@ TEST_F(Commit, RunsNoHookAndSignsNothing)
     repository_.git({"config", "commit.gpgSign", "true"});
     commit();
     EXPECT_THAT(status(), IsEmpty());
-    EXPECT_THAT(linesOf(repository_.git({"cat-file", "commit", "HEAD"})),
+    EXPECT_THAT(split(repository_.git({"cat-file", "commit", "HEAD"})),
                 Not(Contains(testing::StartsWith("gpgsig"))));
 }
 
@@ -281,7 +281,7 @@ TEST_F(Commit, OfOneAdapterFollowsAnother)
         adapter->commit(upath(), asUtf16(content));
         EXPECT_EQ(committed("file"), content);
     }
-    EXPECT_THAT(linesOf(repository_.git({"log", "--format=%s"})),
+    EXPECT_THAT(split(repository_.git({"log", "--format=%s"})),
                 ElementsAre("three", "two", "one", "first"));
 }
 

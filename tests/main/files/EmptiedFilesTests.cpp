@@ -202,7 +202,7 @@ TEST_F(EmptiedFiles, LoseNoEntryBesideThem)
     repository_.remove("#folder");
     repository_.write("#folder", "instead");
     markResolved("#folder");
-    const auto staged = linesOf(repository_.git({"ls-files"}));
+    const auto staged = split(repository_.git({"ls-files"}));
     EXPECT_THAT(staged, Contains("#folder"));
     EXPECT_THAT(staged, Not(Contains("#folder/file")));
     repository_.write("#folder", "");
@@ -214,7 +214,7 @@ TEST_F(EmptiedFiles, LoseNoEntryBesideThem)
     EXPECT_EQ(after, before);
     expectCommittedAsByGit();
     EXPECT_THAT(
-        linesOf(repository_.git({"ls-files"})),
+        split(repository_.git({"ls-files"})),
         ElementsAre(" first", "#folder", ".gitattributes", "file", "new", "other", "sub/inside"));
 }
 

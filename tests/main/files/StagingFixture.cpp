@@ -2,9 +2,9 @@
 #include "StagingFixture.hpp"
 
 #include <filesystem>
-#include <sstream>
 
 #include "support/UnprivilegedUser.hpp"
+#include "support/strings.hpp"
 
 namespace vclink::test
 {
@@ -62,12 +62,9 @@ std::vector<std::string> StagingFixture::inRoot(const std::vector<std::string> &
 
 std::vector<std::string> StagingFixture::status() const
 {
-    std::istringstream stream(repository_.git({"--no-optional-locks", "status", "--porcelain",
-                                               "--untracked-files=all", "--no-renames", "-z"}));
-    std::vector<std::string> entries;
-    for (std::string entry; std::getline(stream, entry, '\0');)
-        entries.push_back(entry);
-    return entries;
+    return split(repository_.git({"--no-optional-locks", "status", "--porcelain",
+                                  "--untracked-files=all", "--no-renames", "-z"}),
+                 '\0');
 }
 
 RepositoryState

@@ -15,6 +15,7 @@
 #include "error/logging/severity.hpp"
 #include "support/LogCapture.hpp"
 #include "support/SignalAction.hpp"
+#include "support/readFile.hpp"
 #include "support/text.hpp"
 #include "vclink/git/GitException.hpp"
 #include "vclink/git/messageIdentifiers.hpp"
@@ -190,7 +191,7 @@ TEST_F(DrivenMergeFailure, OfAHostThatIgnoresItsChildrenStartsNoCommand)
         const SignalAction ignored(SIGCHLD, SIG_IGN);
         EXPECT_THAT(failureHere(), HasSubstr("SIGCHLD"));
     }
-    EXPECT_EQ(Scripts::read(mark), "");
+    EXPECT_EQ(readFile(mark), "");
     expectTheNextToSucceed();
 }
 
@@ -218,7 +219,7 @@ TEST_F(DrivenMergeFailure, OfASideThatCannotBeReadIsLibGit2s)
         repository_.write(object, bytes);
         EXPECT_EQ(branches().getRepositoryState(), "Normal");
     }
-    EXPECT_EQ(Scripts::read(mark), "");
+    EXPECT_EQ(readFile(mark), "");
     expectTheNextToSucceed();
 }
 
@@ -233,7 +234,7 @@ TEST_F(DrivenMergeFailure, OfAnyKindIsToldBeforeTheNextFileIsAskedFor)
     repository_.git({"config", "merge.second.driver", scripts_.shell("echo run >" + mark)});
     define("/nowhere/tool");
     EXPECT_THAT(failure(), HasSubstr("No such file or directory"));
-    EXPECT_EQ(Scripts::read(mark), "");
+    EXPECT_EQ(readFile(mark), "");
 }
 
 } // namespace

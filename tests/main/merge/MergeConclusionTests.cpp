@@ -163,7 +163,7 @@ TEST_F(MergeConclusion, TakesTheirFileThatWeDeletedWhereItStands)
     repository_.commitAll(writes("file", "theirs\n"), "theirs");
     repository_.git({"checkout", "--quiet", "main"});
     EXPECT_FALSE(repository_.tryGit({"merge", "--quiet", "theirs"}).succeeded());
-    ASSERT_EQ(linesOf(repository_.git({"ls-files", "--unmerged"})).size(), 2U);
+    ASSERT_EQ(split(repository_.git({"ls-files", "--unmerged"})).size(), 2U);
     commit();
     EXPECT_EQ(committed("file"), "theirs\n");
     expectNothingUnderWay();
@@ -246,7 +246,7 @@ TEST_F(MergeConclusion, TakesAMergeHeadAsOftenAsItIsListed)
     const std::string theirs = idOf("theirs");
     repository_.write(".git/MERGE_HEAD", theirs + '\n' + theirs + '\n');
     commit();
-    EXPECT_THAT(linesOf(repository_.git({"log", "-1", "--format=%P"})),
+    EXPECT_THAT(split(repository_.git({"log", "-1", "--format=%P"})),
                 ElementsAre(head + ' ' + theirs + ' ' + theirs));
 }
 

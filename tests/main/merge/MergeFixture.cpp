@@ -148,7 +148,7 @@ void MergeFixture::crissCross(const Change &ours, const Change &theirs)
     repository_.git({"merge", "--quiet", "--no-edit", first});
     repository_.commitAll(theirs, "on topic again");
     repository_.git({"checkout", "--quiet", "main"});
-    ASSERT_EQ(splitLines(repository_.git({"merge-base", "--all", "main", "topic"})).size(), 2U);
+    ASSERT_EQ(split(repository_.git({"merge-base", "--all", "main", "topic"})).size(), 2U);
 }
 
 GitRepository MergeFixture::addModule()
@@ -220,7 +220,7 @@ void MergeFixture::expectConflictsAsGit(const std::vector<std::string> &expected
 std::vector<std::string> MergeFixture::conflicts() const
 {
     std::vector<std::string> lines =
-        splitLines(repository_.git({"ls-files", "--unmerged", "--format=%(stage) %(path)"}));
+        split(repository_.git({"ls-files", "--unmerged", "--format=%(stage) %(path)"}));
     return lines;
 }
 
@@ -232,7 +232,7 @@ std::string MergeFixture::message() const
 
 std::vector<std::string> MergeFixture::parents() const
 {
-    return splitLines(repository_.git({"rev-parse", "HEAD^@"}));
+    return split(repository_.git({"rev-parse", "HEAD^@"}));
 }
 
 } // namespace vclink::test

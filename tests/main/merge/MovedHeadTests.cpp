@@ -326,7 +326,7 @@ TEST_F(MovedHead, IsNoneIfTheAdaptersOwnCommitMovesIt)
         asPath(repository_.path()),
         std::static_pointer_cast<vclink::ApplicationInteractor>(interactor_));
     git::BranchManager::create(adapter)->merge("topic");
-    EXPECT_EQ(splitLines(repository_.git({"log", "--first-parent", "-3", "--format=%s"})),
+    EXPECT_EQ(split(repository_.git({"log", "--first-parent", "-3", "--format=%s"})),
               (std::vector<std::string>{"and once more", "Merge branch 'topic'", "on main"}));
 }
 

@@ -80,7 +80,7 @@ class UnmergeableConflicts : public MergeFixture
     }
     void expectStages(const std::string &name) const
     {
-        const auto stages = splitLines(repository_.git(
+        const auto stages = split(repository_.git(
             {"--literal-pathspecs", "ls-files", "--unmerged", "--format=%(stage)", "--", name}));
         EXPECT_THAT(stages, ElementsAre("1", "2", "3")) << name;
     }

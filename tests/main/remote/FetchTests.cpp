@@ -45,7 +45,7 @@ class Fetch : public RemoteFixture, public testing::WithParamInterface<Naming>
     }
     std::vector<std::string> remoteBranches() const
     {
-        return splitLines(
+        return split(
             repository_.git({"for-each-ref", "--format=%(refname:lstrip=3)", "refs/remotes"}));
     }
 };

@@ -63,7 +63,7 @@ class RemoteHeads : public RemoteFixture, public testing::WithParamInterface<Nam
     }
     std::vector<std::string> headsOfGit() const
     {
-        return splitLines(repository_.git({"ls-remote", "origin"}));
+        return split(repository_.git({"ls-remote", "origin"}));
     }
     /// The symbolic target of each head that has one, behind its name.
     std::vector<std::string> symbolicHeads() const

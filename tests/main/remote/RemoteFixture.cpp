@@ -67,18 +67,12 @@ std::string RemoteFixture::commit(const std::string &name, const std::string &by
 
 std::vector<std::string> RemoteFixture::references(const GitRepository &repository)
 {
-    return splitLines(
-        repository.git({"for-each-ref", "--format=%(refname) %(objectname) %(symref)"}));
+    return split(repository.git({"for-each-ref", "--format=%(refname) %(objectname) %(symref)"}));
 }
 
 GitRepository RemoteFixture::twin() const
 {
-    GitRepository copy(folder() / "twin");
-    std::filesystem::remove_all(copy.path());
-    std::filesystem::copy(repository_.path(), copy.path(),
-                          std::filesystem::copy_options::recursive |
-                              std::filesystem::copy_options::copy_symlinks);
-    return copy;
+    return repository_.copyTo(folder() / "twin");
 }
 
 } // namespace vclink::test

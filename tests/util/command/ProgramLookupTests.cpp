@@ -13,6 +13,7 @@
 
 #include "RunCommandFixture.hpp"
 #include "support/WorkingFolder.hpp"
+#include "support/readFile.hpp"
 #include "util/command/programLookup.hpp"
 
 namespace
@@ -196,7 +197,7 @@ TEST_F(ProgramLookup, HandsTheOtherWordsOverAsTheyAre)
     fs::copy(program, folder() / "a b" / "tool");
     setPath("@/a b:/usr/bin:/bin");
     EXPECT_EQ(resultOf("tool \"x y\" z\"\" \"\" 'a"), 0);
-    EXPECT_EQ(vclink::test::Scripts::read(scripts_.folder() / "words"), "x y|z\"\"||'a|");
+    EXPECT_EQ(vclink::test::readFile(scripts_.folder() / "words"), "x y|z\"\"||'a|");
 }
 
 TEST_F(ProgramLookup, LeavesTheRecordOfTheCommandAsItIs)

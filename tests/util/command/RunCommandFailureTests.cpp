@@ -21,6 +21,7 @@
 #include "support/DescriptorLimit.hpp"
 #include "support/LogCapture.hpp"
 #include "support/UnprivilegedUser.hpp"
+#include "support/readFile.hpp"
 #include "util/command/runCommand.hpp"
 
 namespace
@@ -243,7 +244,7 @@ TEST_F(RunCommandFailure, EndsACommandThatAnExceptionLeaves)
             });
         EXPECT_THROW(static_cast<void>(runCommand(program, {})), std::domain_error);
     }
-    const std::string process = Scripts::read(identity);
+    const std::string process = readFile(identity);
     ASSERT_FALSE(process.empty());
     EXPECT_EQ(::kill(std::stoi(process), 0), -1);
     EXPECT_EQ(errno, ESRCH);
@@ -257,7 +258,7 @@ TEST_F(RunCommandFailure, StartsNothingWhenTheRecordOfTheCommandFails)
     LogCapture log(0x08);
     log.onRecord([](const LogRecord &) { throw std::domain_error("sink"); });
     EXPECT_THROW(static_cast<void>(runCommand(program, {})), std::domain_error);
-    EXPECT_EQ(Scripts::read(mark), "");
+    EXPECT_EQ(readFile(mark), "");
 }
 
 } // namespace

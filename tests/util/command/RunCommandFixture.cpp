@@ -5,6 +5,7 @@
 
 #include "processError.hpp"
 #include "support/LogCapture.hpp"
+#include "support/readFile.hpp"
 #include "util/command/runCommand.hpp"
 
 namespace vclink::test
@@ -68,7 +69,7 @@ std::vector<std::string> RunCommandFixture::wordsOf(const std::string &commandTe
         scripts_.shell("for word; do printf '%s\\0' \"$word\"; done >" + out);
     EXPECT_EQ(resultOf(commandTemplate, {{"%T", program}}), 0);
     std::vector<std::string> words;
-    const std::string bytes = Scripts::read(out);
+    const std::string bytes = readFile(out);
     for (std::size_t begin = 0; begin < bytes.size();)
     {
         words.emplace_back(bytes.c_str() + begin);

@@ -8,6 +8,7 @@
 
 #include "RunCommandFixture.hpp"
 #include "support/Command.hpp"
+#include "support/readFile.hpp"
 #include "util/command/runCommand.hpp"
 
 namespace
@@ -57,7 +58,7 @@ TEST_F(RunCommandReading, LetsACommandThatFillsThePipeAfterAnEmptyLineBlock)
         [&]
         {
             std::string id;
-            while ((id = vclink::test::Scripts::read(process)).empty() || id.back() != '\n')
+            while ((id = vclink::test::readFile(process)).empty() || id.back() != '\n')
                 std::this_thread::yield();
             id.pop_back();
             EXPECT_TRUE(vclink::test::Command({killer, id}).run().succeeded())
@@ -72,14 +73,14 @@ TEST_F(RunCommandReading, WaitsForASilentCommandToEnd)
 {
     const std::string done = folder() / "done";
     EXPECT_EQ(resultOf(scripts_.shell("sleep 0.3; echo yes >" + done)), 0);
-    EXPECT_EQ(vclink::test::Scripts::read(done), "yes\n");
+    EXPECT_EQ(vclink::test::readFile(done), "yes\n");
 }
 
 TEST_F(RunCommandReading, WaitsForACommandThatHasClosedItsOutput)
 {
     const std::string done = folder() / "done";
     EXPECT_EQ(resultOf(scripts_.shell("exec >&-; sleep 0.3; echo yes >" + done + "; exit 4")), 4);
-    EXPECT_EQ(vclink::test::Scripts::read(done), "yes\n");
+    EXPECT_EQ(vclink::test::readFile(done), "yes\n");
 }
 
 TEST_F(RunCommandReading, LastsAsLongAsAGrandchildHoldsTheOutput)
@@ -90,7 +91,7 @@ TEST_F(RunCommandReading, LastsAsLongAsAGrandchildHoldsTheOutput)
     const std::string program = scripts_.shell(waitUntilRead() + '\n' + grandchild + " & exit 6");
     const int result = vclink::git::runCommand(program, {});
     EXPECT_EQ(result, 6);
-    EXPECT_EQ(vclink::test::Scripts::read(done), "yes\n");
+    EXPECT_EQ(vclink::test::readFile(done), "yes\n");
 }
 
 TEST_F(RunCommandReading, EndsWithTheCommandThoughMoreIsThere)

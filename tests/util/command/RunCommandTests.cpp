@@ -15,6 +15,7 @@
 #include "support/Descriptors.hpp"
 #include "support/LogCapture.hpp"
 #include "support/WorkingFolder.hpp"
+#include "support/readFile.hpp"
 
 namespace
 {
@@ -96,7 +97,7 @@ TEST_F(RunCommand, HandsTheWholeEnvironmentOver)
     ::setenv("VCLINK_TEST_VARIABLE", "a b\"c", 1);
     const std::string out = folder() / "environment";
     EXPECT_EQ(resultOf(scripts_.shell("env -0 | sort -z >" + out)), 0);
-    const std::string bytes = Scripts::read(out);
+    const std::string bytes = readFile(out);
     for (char **variable = environ; *variable != nullptr; ++variable)
     {
         const std::string text = *variable;
@@ -124,7 +125,7 @@ TEST_F(RunCommand, GivesTheCommandItsOutputAndNoOtherPipe)
         before.insert(descriptor.second);
     EXPECT_EQ(resultOf(program), 0);
     std::set<std::string> pipes;
-    std::istringstream lines(Scripts::read(out));
+    std::istringstream lines(readFile(out));
     for (std::string line; std::getline(lines, line);)
     {
         if (line.compare(0, 5, "pipe:") == 0 && before.count(line) == 0)

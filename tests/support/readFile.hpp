@@ -1,0 +1,19 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <filesystem>
+#include <fstream>
+#include <iterator>
+#include <string>
+
+namespace vclink::test
+{
+
+/// What a file holds, byte by byte; empty if it cannot be read.
+inline std::string readFile(const std::filesystem::path &file)
+{
+    std::ifstream stream(file, std::ios::binary);
+    return {std::istreambuf_iterator<char>(stream), {}};
+}
+
+} // namespace vclink::test
