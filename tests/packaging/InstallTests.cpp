@@ -4,7 +4,6 @@
 #include <algorithm>
 #include <filesystem>
 #include <fstream>
-#include <iterator>
 #include <regex>
 #include <string>
 #include <vector>
@@ -127,8 +126,7 @@ TEST_F(Component, DevelopmentHasDocumentsWhoseLinksLeadToInstalledFiles)
         {
             continue;
         }
-        std::ifstream stream(page);
-        const std::string text(std::istreambuf_iterator<char>(stream), {});
+        const std::string text = readFile(page);
         for (std::sregex_iterator found(text.begin(), text.end(), link), end; found != end; ++found)
         {
             const std::string target = (*found)[1];
