@@ -117,28 +117,25 @@ void refuseConflicts(git_index *index, const PathspecArray &pathspec, const upat
     }
 }
 
-void resetEntries(git_repository *repository, const git_object *head, const PathspecArray &pathspec,
-                  const FileStateMap &states, const upath &root)
+void resetEntries(git_repository *repository, git_index *index, const git_object *head,
+                  const PathspecArray &pathspec, const FileStateMap &states, const upath &root)
 {
-    // The index of the resets and the checkout. Without this call it would be empty if libgit2
-    // cannot read the index file, and would then have only these entries.
-    const OwnedHandle<git_index> index = getRepositoryIndex(repository);
     // Without states, because they could not be read, none was in conflict.
     if (states.empty())
     {
-        refuseConflicts(index.get(), pathspec, root);
+        refuseConflicts(index, pathspec, root);
     }
     const std::vector<std::string> names = changedNames(states, root);
     resetToHead(repository, head, pathspec, names.size());
     // If a file became a link in the index, or a link a file, the first reset removes it from the
     // index and the second one restores it.
-    if (head != nullptr && !areIndexed(index.get(), names))
+    if (head != nullptr && !areIndexed(index, names))
     {
         resetToHead(repository, head, pathspec, names.size());
     }
-    if (takeOutBelowFiles(index.get(), pathspec))
+    if (takeOutBelowFiles(index, pathspec))
     {
-        writeIndex(index.get());
+        writeIndex(index);
     }
 }
 
@@ -174,13 +171,20 @@ void GitAdapter::revertFiles(const std::vector<upath> &files)
     IndexLock lock(repository.get());
     // Without a HEAD the reset removes the paths from the index.
     const GitResult<OwnedHandle<git_object>> head = revparseObject(repository.get(), "HEAD");
-    resetEntries(repository.get(), head.has_value() ? head.value().get() : nullptr, pathspec,
-                 states, root_);
+    // The index of the resets and the checkout. Without this call it would be empty if libgit2
+    // cannot read the index file, and would then have only these entries.
+    const OwnedHandle<git_index> index = getRepositoryIndex(repository.get());
+    resetEntries(repository.get(), index.get(), head.has_value() ? head.value().get() : nullptr,
+                 pathspec, states, root_);
     const std::shared_ptr<GitOptionsFactory> factory = optionsFactory_;
     CheckoutOptions options = factory->makeCheckoutOptions();
     options.checkoutStrategy = GIT_CHECKOUT_FORCE | GIT_CHECKOUT_RECREATE_MISSING;
     git_checkout_options record = toGitCheckoutOptions(options, callbacks_->checkoutCallbacks());
     record.paths = getArray(pathspec);
+    // The listed files are the same in HEAD and in the index now. If libgit2 compared the two, it
+    // could take one of these files for another one with the same content that is a folder in the
+    // index, and remove it.
+    record.baseline_index = head.has_value() ? index.get() : nullptr;
     const CheckoutWatch watch(CheckoutKind::Revert, repository.get(), record);
     const GitResult<void> restored = call(git_checkout_index, repository.get(), nullptr, &record);
     if (watch.hasRefused())

@@ -132,6 +132,41 @@ const RevertRow kindRows[]{
 INSTANTIATE_TEST_SUITE_P(Kind, RevertedAsByGit, testing::ValuesIn(kindRows),
                          testing::PrintToStringParamName());
 
+/// A folder is staged in the place of a file with the same content, which is not listed.
+Change stagesFolderOfTwin(const Change &change)
+{
+    return change + [](const GitRepository &copy)
+    {
+        copy.git({"rm", "--quiet", "same-b"});
+        copy.write("same-b/in", "x");
+        copy.add({"same-b"});
+    };
+}
+
+const Change makesTwins = writes("same-a", "same\n") + writes("same-b", "same\n");
+const std::vector<std::string> statusOfTwins{"D  same-b", "A  same-b/in"};
+
+const RevertRow twinRows[]{
+    {{"Unchanged"},
+     stagesFolderOfTwin(changesNothing),
+     {"same-a", "sub/inside"},
+     statusOfTwins,
+     makesTwins},
+    {{"Edited"},
+     stagesFolderOfTwin(writes("same-a", "edited\n")),
+     {"same-a", "sub/inside"},
+     statusOfTwins,
+     makesTwins},
+    {{"StagedAsDeleted"},
+     stagesFolderOfTwin(runsGit({"rm", "--quiet", "same-a"})),
+     {"same-a", "sub/inside"},
+     statusOfTwins,
+     makesTwins},
+};
+
+INSTANTIATE_TEST_SUITE_P(TwinOfAStagedFolder, RevertedAsByGit, testing::ValuesIn(twinRows),
+                         testing::PrintToStringParamName());
+
 /// And does not write a file without changes.
 TEST_F(RevertFiles, LeavesAddedUntrackedAndIgnoredFilesAlone)
 {
