@@ -16,6 +16,7 @@
 
 #include "error/errorUtil/GitResult.hpp"
 #include "error/errorUtil/callbackException.hpp"
+#include "error/errorUtil/libgit2Errors.hpp"
 #include "error/errorUtil/raiseGitError.hpp"
 
 namespace vclink::git
@@ -162,6 +163,7 @@ WithoutConfiguration::WithoutConfiguration(git_repository *repository)
 
 WithoutConfiguration::~WithoutConfiguration()
 {
+    git_error_clear();
     git_repository_set_config(repository_, before_.get());
 }
 
