@@ -11,8 +11,9 @@
 #include <fcntl.h>
 #include <poll.h>
 #include <spawn.h>
-#include <sys/wait.h>
 #include <unistd.h>
+
+#include "support/processes.hpp"
 
 namespace vclink::test
 {
@@ -33,10 +34,8 @@ Casualty::Casualty(const std::vector<std::string> &command)
     std::array<int, 2> ends{};
     if (::pipe2(ends.data(), O_CLOEXEC) != 0)
         raise(errno, "pipe2");
-    std::vector<char *> arguments;
-    for (const auto &argument : command)
-        arguments.push_back(const_cast<char *>(argument.c_str()));
-    arguments.push_back(nullptr);
+    auto words = command;
+    const auto arguments = makePointers(words);
     posix_spawn_file_actions_t actions;
     ::posix_spawn_file_actions_init(&actions);
     ::posix_spawn_file_actions_adddup2(&actions, ends[1], STDOUT_FILENO);
@@ -113,9 +112,7 @@ void Casualty::kill() noexcept
     if (process_ < 0)
         return;
     ::kill(process_, SIGKILL);
-    while (::waitpid(process_, nullptr, 0) < 0 && errno == EINTR)
-    {
-    }
+    collectStatus(process_);
     process_ = -1;
 }
 

@@ -7,6 +7,7 @@
 #include <gtest/gtest.h>
 
 #include "DesktopFixture.hpp"
+#include "support/Change.hpp"
 #include "support/Scripts.hpp"
 #include "text.hpp"
 
@@ -26,14 +27,6 @@ class BranchCommands : public DesktopFixture
         repository_.write("a", "first\n");
         repository_.commitAll("first");
     }
-    /// A branch with these files, and back to main.
-    void makeBranch(const std::string &name, const std::string &file, const std::string &text)
-    {
-        repository_.git({"checkout", "--quiet", "-b", name});
-        repository_.write(file, text);
-        repository_.commitAll(name);
-        repository_.git({"checkout", "--quiet", "main"});
-    }
     void choose(const std::string &command, const QStringList &values)
     {
         DesktopFixture::choose(command);
@@ -48,7 +41,7 @@ class BranchCommands : public DesktopFixture
 
 TEST_F(BranchCommands, NewBranchBeginsWhereItIsTold)
 {
-    makeBranch("topic", "b", "topic\n");
+    repository_.makeBranch("topic", writes("b", "topic\n"));
     open();
     choose("newBranch", {"lake", "topic"});
     EXPECT_EQ(repository_.line({"rev-parse", "lake"}), repository_.line({"rev-parse", "topic"}));
@@ -64,7 +57,7 @@ TEST_F(BranchCommands, NewBranchBeginsAtTheLastCommitIfNothingElseIsChosen)
 
 TEST_F(BranchCommands, DeleteTellsTheCommitForTheWayBack)
 {
-    makeBranch("topic", "b", "topic\n");
+    repository_.makeBranch("topic", writes("b", "topic\n"));
     const std::string id = repository_.line({"rev-parse", "topic"});
     open();
     choose("deleteBranch", {"topic"});
@@ -76,7 +69,7 @@ TEST_F(BranchCommands, DeleteTellsTheCommitForTheWayBack)
 
 TEST_F(BranchCommands, SwitchChecksTheBranchOut)
 {
-    makeBranch("topic", "b", "topic\n");
+    repository_.makeBranch("topic", writes("b", "topic\n"));
     open();
     EXPECT_EQ(find<QLabel>("branch").text(), "main");
     choose("switch", {"topic"});
@@ -87,7 +80,7 @@ TEST_F(BranchCommands, SwitchChecksTheBranchOut)
 
 TEST_F(BranchCommands, ARefusedSwitchIsToldAndLosesNothing)
 {
-    makeBranch("topic", "a", "topic\n");
+    repository_.makeBranch("topic", writes("a", "topic\n"));
     open();
     repository_.write("a", "work\n");
     choose("switch", {"topic"});
@@ -98,7 +91,7 @@ TEST_F(BranchCommands, ARefusedSwitchIsToldAndLosesNothing)
 
 TEST_F(BranchCommands, MergeFastForwards)
 {
-    makeBranch("topic", "b", "topic\n");
+    repository_.makeBranch("topic", writes("b", "topic\n"));
     open();
     choose("merge", {"topic"});
     EXPECT_EQ(repository_.line({"rev-parse", "HEAD"}), repository_.line({"rev-parse", "topic"}));
@@ -113,7 +106,7 @@ TEST_F(BranchCommands, MergeRunsADriver)
     repository_.write(".gitattributes", "*.dat merge=join\n");
     repository_.write("x.dat", "first\n");
     repository_.commitAll("data");
-    makeBranch("topic", "x.dat", "theirs\n");
+    repository_.makeBranch("topic", writes("x.dat", "theirs\n"));
     repository_.write("x.dat", "ours\n");
     repository_.commitAll("ours");
     open();
@@ -127,7 +120,7 @@ TEST_F(BranchCommands, MergeRunsADriver)
 
 TEST_F(BranchCommands, MergeRefusesUncommittedWorkAndSaysWhy)
 {
-    makeBranch("topic", "b", "topic\n");
+    repository_.makeBranch("topic", writes("b", "topic\n"));
     repository_.write("c", "ours\n");
     repository_.commitAll("ours");
     open();

@@ -11,6 +11,7 @@
 #include <gtest/gtest.h>
 
 #include "DesktopFixture.hpp"
+#include "support/Change.hpp"
 #include "text.hpp"
 
 namespace
@@ -28,20 +29,15 @@ class Cancel : public DesktopFixture
         repository_.write("a", "first\n");
         repository_.commitAll("first");
         repository_.git({"branch", "same"});
-        repository_.git({"checkout", "--quiet", "-b", "topic"});
-        repository_.write("a", "topic\n");
-        repository_.commitAll("topic");
-        repository_.git({"checkout", "--quiet", "main"});
+        repository_.makeBranch("topic", writes("a", "topic\n"));
         repository_.git({"config", "core.filesRefLockTimeout", "20000"});
     }
     void makeManyFiles(int count)
     {
-        repository_.git({"checkout", "--quiet", "-b", "many"});
+        std::vector<std::string> names;
         for (int file = 0; file < count; ++file)
-            repository_.write("folder" + std::to_string(file % 50) + "/" + std::to_string(file),
-                              "text\n");
-        repository_.commitAll("many");
-        repository_.git({"checkout", "--quiet", "main"});
+            names.push_back("folder" + std::to_string(file % 50) + "/" + std::to_string(file));
+        repository_.makeBranch("many", writesEach(names, "text\n"));
     }
     void lock(const std::string &reference)
     {

@@ -9,6 +9,7 @@
 #include "ConflictDialog.hpp"
 #include "DesktopFixture.hpp"
 #include "fl/filesystem/operations.hpp"
+#include "support/Change.hpp"
 #include "support/Scripts.hpp"
 #include "text.hpp"
 #include "vclink_host/installation.hpp"
@@ -28,11 +29,7 @@ class Conflicts : public DesktopFixture
         repository_.write("a", "first\n");
         repository_.write("b", "first\n");
         repository_.commitAll("first");
-        repository_.git({"checkout", "--quiet", "-b", "topic"});
-        repository_.write("a", "theirs\n");
-        repository_.remove("b");
-        repository_.commitAll("theirs");
-        repository_.git({"checkout", "--quiet", "main"});
+        repository_.makeBranch("topic", writes("a", "theirs\n") + removes("b"));
         repository_.write("a", "ours\n");
         repository_.write("b", "ours\n");
         repository_.commitAll("ours");

@@ -13,6 +13,8 @@
 #include <sys/wait.h>
 #include <unistd.h>
 
+#include "support/processes.hpp"
+
 namespace vclink::test
 {
 namespace
@@ -81,17 +83,6 @@ bool readAnswer(int answerEnd, std::chrono::milliseconds timeout, std::string &t
     }
 }
 
-int waitForStatus(pid_t child)
-{
-    int status = 0;
-    while (::waitpid(child, &status, 0) < 0)
-    {
-        if (errno != EINTR)
-            failAt("waitpid");
-    }
-    return status;
-}
-
 } // namespace
 
 std::string runInChild(const std::function<std::string()> &action,
@@ -122,7 +113,7 @@ std::string runInChild(const std::function<std::string()> &action,
     ::close(ends[0]);
     if (!inTime)
         ::kill(child, SIGKILL);
-    const int status = waitForStatus(child);
+    const int status = collectStatus(child);
     if (!inTime)
         return "the child process took too long";
     if (WIFSIGNALED(status))

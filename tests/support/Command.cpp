@@ -8,13 +8,13 @@
 #include <system_error>
 #include <utility>
 
-#include <fcntl.h>
-#include <poll.h>
 #include <spawn.h>
 #include <sys/mman.h>
-#include <sys/syscall.h>
 #include <sys/wait.h>
 #include <unistd.h>
+
+#include "support/Descriptor.hpp"
+#include "support/processes.hpp"
 
 namespace vclink::test
 {
@@ -26,36 +26,12 @@ namespace
     throw std::system_error(error, std::generic_category(), what);
 }
 
-/// Owns a descriptor.
-class Descriptor
-{
-  public:
-    Descriptor(int number, const char *what) : number_(number)
-    {
-        if (number_ < 0)
-            raise(errno, what);
-    }
-    Descriptor(const Descriptor &) = delete;
-    Descriptor &operator=(const Descriptor &) = delete;
-    ~Descriptor()
-    {
-        ::close(number_);
-    }
-    int get() const noexcept
-    {
-        return number_;
-    }
-
-  private:
-    int number_;
-};
-
 /// A file in memory that a program is given as one of its standard streams.
 class Stream
 {
   public:
     explicit Stream(const std::string &bytes = {})
-        : file_(::memfd_create("stream", MFD_CLOEXEC), "memfd_create")
+        : file_(Descriptor::checked(::memfd_create("stream", MFD_CLOEXEC), "memfd_create"))
     {
         for (std::size_t done = 0; done < bytes.size();)
         {
@@ -152,64 +128,6 @@ class Attributes
     posix_spawnattr_t attributes_{};
 };
 
-std::vector<char *> makePointers(std::vector<std::string> &texts)
-{
-    std::vector<char *> pointers;
-    pointers.reserve(texts.size() + 1);
-    for (auto &text : texts)
-        pointers.push_back(text.data());
-    pointers.push_back(nullptr);
-    return pointers;
-}
-
-/// As waitForEnd(), where a process can't be watched, under valgrind for one.
-bool lookForEnd(pid_t process, std::chrono::milliseconds time)
-{
-    const auto end = std::chrono::steady_clock::now() + time;
-    for (;;)
-    {
-        siginfo_t info = {};
-        if (::waitid(P_PID, static_cast<id_t>(process), &info, WEXITED | WNOHANG | WNOWAIT) != 0)
-            raise(errno, "waitid");
-        if (info.si_pid == process || std::chrono::steady_clock::now() >= end)
-            return info.si_pid == process;
-        ::poll(nullptr, 0, 1);
-    }
-}
-
-/// Whether the process ended within the time.
-bool waitForEnd(pid_t process, std::chrono::milliseconds time)
-{
-    // The C library's own declaration of this call can't be linked from C++ in every release.
-    const auto opened = ::syscall(SYS_pidfd_open, process, 0);
-    if (opened < 0 && errno == ENOSYS)
-        return lookForEnd(process, time);
-    const Descriptor watched(static_cast<int>(opened), "pidfd_open");
-    const auto end = std::chrono::steady_clock::now() + time;
-    for (;;)
-    {
-        const auto left = std::chrono::duration_cast<std::chrono::milliseconds>(
-            end - std::chrono::steady_clock::now());
-        pollfd event{watched.get(), POLLIN, 0};
-        const int ready = ::poll(&event, 1, left.count() > 0 ? static_cast<int>(left.count()) : 0);
-        if (ready >= 0)
-            return ready > 0;
-        if (errno != EINTR)
-            raise(errno, "poll");
-    }
-}
-
-int collectStatus(pid_t process)
-{
-    int status = 0;
-    while (::waitpid(process, &status, 0) < 0)
-    {
-        if (errno != EINTR)
-            raise(errno, "waitpid");
-    }
-    return status;
-}
-
 } // namespace
 
 Command::Command(std::vector<std::string> arguments) : arguments_(std::move(arguments))
@@ -293,7 +211,7 @@ CommandResult Command::run() const
         raise(error, text());
 
     CommandResult result;
-    result.timedOut = !waitForEnd(process, timeout_);
+    result.timedOut = !endsWithin(process, timeout_);
     if (result.timedOut)
         ::kill(-process, SIGKILL);
     const int status = collectStatus(process);

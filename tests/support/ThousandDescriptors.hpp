@@ -3,7 +3,11 @@
 
 #include <vector>
 
-#include <sys/resource.h>
+#include <fcntl.h>
+#include <gtest/gtest.h>
+
+#include "support/Descriptor.hpp"
+#include "support/DescriptorLimit.hpp"
 
 namespace vclink::test
 {
@@ -13,14 +17,17 @@ namespace vclink::test
 class ThousandDescriptors
 {
   public:
-    ThousandDescriptors();
-    ThousandDescriptors(const ThousandDescriptors &) = delete;
-    ThousandDescriptors &operator=(const ThousandDescriptors &) = delete;
-    ~ThousandDescriptors();
+    ThousandDescriptors()
+    {
+        constexpr int count = 1000;
+        for (int i = 0; i < count; ++i)
+            open_.emplace_back(::open("/dev/null", O_RDONLY | O_CLOEXEC));
+        EXPECT_GE(open_.back().get(), count);
+    }
 
   private:
-    rlimit limitBefore_{};
-    std::vector<int> open_;
+    const DescriptorLimit limit_{4096};
+    std::vector<Descriptor> open_;
 };
 
 } // namespace vclink::test

@@ -64,8 +64,8 @@ CertificateAuthority::CertificateAuthority(fs::path folder) : folder_(std::move(
                  "keyUsage=critical,keyCertSign"});
 }
 
-Certificate CertificateAuthority::issue(const std::string &name, const std::string &host,
-                                        Validity validity) const
+void CertificateAuthority::issue(const std::string &name, const std::string &host,
+                                 Validity validity) const
 {
     makeRequest(folder_, name, name + ".csr", host, {"-addext", "subjectAltName=DNS:" + host});
     std::vector<std::string> arguments{"ca",  "-batch",      "-notext", "-config",    "ca.conf",
@@ -76,14 +76,12 @@ Certificate CertificateAuthority::issue(const std::string &name, const std::stri
         arguments.insert(arguments.end(),
                          {"-startdate", "20010101000000Z", "-enddate", "20020101000000Z"});
     openssl(folder_, std::move(arguments));
-    return {folder_ / (name + ".pem"), folder_ / (name + ".key")};
 }
 
-Certificate CertificateAuthority::selfSigned(const std::string &name, const std::string &host) const
+void CertificateAuthority::selfSigned(const std::string &name, const std::string &host) const
 {
     makeRequest(folder_, name, name + ".pem", host,
                 {"-x509", "-days", "7", "-addext", "subjectAltName=DNS:" + host});
-    return {folder_ / (name + ".pem"), folder_ / (name + ".key")};
 }
 
 } // namespace vclink::test

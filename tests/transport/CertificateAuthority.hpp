@@ -7,13 +7,6 @@
 namespace vclink::test
 {
 
-/// A certificate, PEM, and the key that belongs to it.
-struct Certificate
-{
-    std::filesystem::path certificate;
-    std::filesystem::path key;
-};
-
 /// Makes certificates of web servers with openssl.
 class CertificateAuthority
 {
@@ -32,10 +25,10 @@ class CertificateAuthority
     {
         return folder_ / "authority.pem";
     }
-    /// A certificate signed by the authority.
-    Certificate issue(const std::string &name, const std::string &host, Validity validity) const;
-    /// A certificate signed by itself.
-    Certificate selfSigned(const std::string &name, const std::string &host) const;
+    /// "NAME.pem", a certificate signed by the authority, and "NAME.key", its key.
+    void issue(const std::string &name, const std::string &host, Validity validity) const;
+    /// The same, signed by itself.
+    void selfSigned(const std::string &name, const std::string &host) const;
 
   private:
     std::filesystem::path folder_;

@@ -37,10 +37,7 @@ sockaddr_in loopback(std::uint16_t port)
 
 Descriptor makeSocket()
 {
-    Descriptor made(::socket(AF_INET, SOCK_STREAM | SOCK_CLOEXEC, 0));
-    if (made.get() < 0)
-        raiseSocketError("socket");
-    return made;
+    return Descriptor::checked(::socket(AF_INET, SOCK_STREAM | SOCK_CLOEXEC, 0), "socket");
 }
 
 Descriptor listenAnywhere()
@@ -63,31 +60,6 @@ std::uint16_t portOf(int socket)
 }
 
 } // namespace
-
-Descriptor::Descriptor(Descriptor &&other) noexcept : number_(std::exchange(other.number_, -1))
-{
-}
-
-Descriptor &Descriptor::operator=(Descriptor &&other) noexcept
-{
-    if (this != &other)
-    {
-        close();
-        number_ = std::exchange(other.number_, -1);
-    }
-    return *this;
-}
-
-Descriptor::~Descriptor()
-{
-    close();
-}
-
-void Descriptor::close() noexcept
-{
-    if (number_ >= 0)
-        ::close(std::exchange(number_, -1));
-}
 
 Connection::Connection(Descriptor socket, int stop) noexcept
     : socket_(std::move(socket)), stop_(stop)

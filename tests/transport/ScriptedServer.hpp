@@ -8,29 +8,10 @@
 #include <string>
 #include <thread>
 
+#include "support/Descriptor.hpp"
+
 namespace vclink::test
 {
-
-/// Owns a descriptor.
-class Descriptor
-{
-  public:
-    explicit Descriptor(int number = -1) noexcept : number_(number)
-    {
-    }
-    Descriptor(Descriptor &&other) noexcept;
-    Descriptor &operator=(Descriptor &&other) noexcept;
-    ~Descriptor();
-
-    int get() const noexcept
-    {
-        return number_;
-    }
-    void close() noexcept;
-
-  private:
-    int number_;
-};
 
 /// One end of a connection, for a script. Nothing waits for longer than a minute, nor after the
 /// server's end has begun; a call that cannot continue throws, which ends the script.

@@ -13,13 +13,13 @@
 #include <utility>
 
 #include <fcntl.h>
-#include <poll.h>
 #include <sys/prctl.h>
-#include <sys/syscall.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
 #include "listening.hpp"
+#include "support/Descriptor.hpp"
+#include "support/processes.hpp"
 #include "support/readFile.hpp"
 
 namespace vclink::test
@@ -32,12 +32,7 @@ using namespace std::chrono_literals;
 
 /// Generous: the machine may be busy.
 constexpr auto startLimit = 60s;
-constexpr int endLimitMilliseconds = 10'000;
-
-[[noreturn]] void raiseProcessError(const std::string &what)
-{
-    throw std::system_error(errno, std::generic_category(), what);
-}
+constexpr auto endLimit = 10s;
 
 std::string valueOf(const char *variable)
 {
@@ -49,15 +44,6 @@ std::vector<std::string> makeEnvironment(const fs::path &folder)
 {
     return {"PATH=" + valueOf("PATH"), "HOME=" + folder.string(), "TMPDIR=" + folder.string(),
             "LC_ALL=C.UTF-8", "GIT_CONFIG_NOSYSTEM=1"};
-}
-
-std::vector<char *> makePointers(std::vector<std::string> &texts)
-{
-    std::vector<char *> pointers;
-    for (auto &text : texts)
-        pointers.push_back(text.data());
-    pointers.push_back(nullptr);
-    return pointers;
 }
 
 /// What the new process needs, made before it is: after the fork only plain system calls are safe.
@@ -88,14 +74,6 @@ struct Start
     ::_exit(127);
 }
 
-int openOrRaise(const char *path, int flags)
-{
-    const int file = ::open(path, flags | O_CLOEXEC, 0644);
-    if (file < 0)
-        raiseProcessError(path);
-    return file;
-}
-
 } // namespace
 
 fs::path findProgram(const std::string &name)
@@ -120,52 +98,36 @@ ServerProcess::ServerProcess(std::vector<std::string> arguments, const fs::path 
     auto environment = makeEnvironment(folder);
     const auto argumentPointers = makePointers(arguments);
     const auto environmentPointers = makePointers(environment);
-    const int input = openOrRaise("/dev/null", O_RDONLY);
-    const int output = openOrRaise(log_.c_str(), O_WRONLY | O_CREAT | O_TRUNC | O_APPEND);
+    const auto input = Descriptor::checked(::open("/dev/null", O_RDONLY | O_CLOEXEC), "/dev/null");
+    const auto output = Descriptor::checked(
+        ::open(log_.c_str(), O_WRONLY | O_CREAT | O_TRUNC | O_APPEND | O_CLOEXEC, 0644),
+        log_.c_str());
     const Start start{::getpid(),
-                      input,
-                      output,
+                      input.get(),
+                      output.get(),
                       folder.c_str(),
                       argumentPointers.data(),
                       environmentPointers.data()};
     process_ = ::fork();
     if (process_ == 0)
         become(start);
-    const int error = errno;
-    ::close(input);
-    ::close(output);
-    errno = error;
     if (process_ < 0)
-        raiseProcessError("fork");
+        throw std::system_error(errno, std::generic_category(), "fork");
 }
 
 ServerProcess::~ServerProcess()
 {
     ::kill(process_, SIGTERM);
-    if (!endsWithin(endLimitMilliseconds))
+    if (!endsWithin(process_, endLimit))
         ::kill(process_, SIGKILL);
     // Those that the program started and left; the group's number is its own until it is collected.
     ::kill(-process_, SIGKILL);
-    while (::waitpid(process_, nullptr, 0) < 0 && errno == EINTR)
-    {
-    }
-}
-
-bool ServerProcess::endsWithin(int milliseconds) const
-{
-    // The C library's own declaration of this call can't be linked from C++ in every release.
-    const int watched = static_cast<int>(::syscall(SYS_pidfd_open, process_, 0));
-    if (watched < 0)
-        return false;
-    pollfd event{watched, POLLIN, 0};
-    const bool ended = ::poll(&event, 1, milliseconds) > 0;
-    ::close(watched);
-    return ended;
+    collectStatus(process_);
 }
 
 bool ServerProcess::hasEnded() const
 {
-    return endsWithin(0);
+    return endsWithin(process_, 0ms);
 }
 
 std::string ServerProcess::log() const

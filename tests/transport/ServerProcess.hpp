@@ -44,8 +44,6 @@ class ServerProcess
     bool waitUntil(const std::function<bool()> &ready) const;
 
   private:
-    bool endsWithin(int milliseconds) const;
-
     std::string text_;
     std::filesystem::path log_;
     pid_t process_ = -1;

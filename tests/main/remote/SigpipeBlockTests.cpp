@@ -15,6 +15,7 @@
 #include <sys/socket.h>
 #include <unistd.h>
 
+#include "support/Descriptor.hpp"
 #include "support/SignalAction.hpp"
 
 namespace vclink::git
@@ -22,28 +23,7 @@ namespace vclink::git
 namespace
 {
 
-class Descriptor
-{
-  public:
-    explicit Descriptor(int number) : number_(number)
-    {
-        if (number < 0)
-            throw std::system_error(errno, std::generic_category());
-    }
-    Descriptor(const Descriptor &) = delete;
-    Descriptor &operator=(const Descriptor &) = delete;
-    ~Descriptor()
-    {
-        ::close(number_);
-    }
-    int get() const noexcept
-    {
-        return number_;
-    }
-
-  private:
-    int number_;
-};
+using test::Descriptor;
 
 /// A connection over loopback that the other side has reset, like a server that ends with unread
 /// data.
@@ -59,7 +39,8 @@ class ResetConnection
         check(::listen(listener_.get(), 1));
         check(::getsockname(listener_.get(), generic, &length_));
         check(::connect(client_.get(), generic, length_));
-        const Descriptor accepted(::accept(listener_.get(), nullptr, nullptr));
+        const auto accepted =
+            Descriptor::checked(::accept(listener_.get(), nullptr, nullptr), "accept");
         const linger reset = {1, 0};
         check(::setsockopt(accepted.get(), SOL_SOCKET, SO_LINGER, &reset, sizeof(reset)));
     }
