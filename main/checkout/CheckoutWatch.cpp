@@ -13,6 +13,7 @@
 #include "main/checkout/conflictLocks.hpp"
 #include "main/checkout/gitlinks.hpp"
 #include "main/checkout/obstaclesAhead.hpp"
+#include "main/checkout/overlookedEdits.hpp"
 #include "main/checkout/severalBases.hpp"
 #include "main/mergeState/MergeBases.hpp"
 #include "util/repository/repository.hpp"
@@ -37,8 +38,9 @@ constexpr std::array<ChangeRule, 11> otherSwitchRules{findIgnoredLink,
                                                       findStagedBelowSubmodule,
                                                       findMissingFileOfOtherKind,
                                                       findUnwritableFolder};
-constexpr std::array<ChangeRule, 3> stagedRules{findStagedSubmodule, findStagedDeletion,
-                                                findStagedContent};
+constexpr std::array<ChangeRule, 5> unforcedRules{findStagedSubmodule, findStagedDeletion,
+                                                  findStagedContent, findStagedThoughIgnored,
+                                                  findOverlookedEdit};
 constexpr std::array<ChangeRule, 4> mergeRules{findBlockedWayOfMerge, findUntracked,
                                                findSubmoduleAfterSibling,
                                                findUnwritableFolderOfConflict};
@@ -122,7 +124,7 @@ Finding CheckoutWatch::judgeSwitch(WorkingCopy &copy, const TreeChange &change)
     }
     if (!found && !isForced_)
     {
-        found = ask(stagedRules, copy, change);
+        found = ask(unforcedRules, copy, change);
     }
     if (!found && isOther && switched_.note(copy, change) && isForced_)
     {
@@ -138,7 +140,7 @@ void CheckoutWatch::lookBeforeMerge(const git_oid *theirs)
     const OwnedHandle<git_tree> after = treeOf(repository_, theirs);
     const std::vector<OwnedHandle<git_tree>> bases =
         readTrees(repository_, MergeBases(repository_, &ours, theirs));
-    Finding first = findHiddenEdit(copy);
+    Finding first = firstOf(findUnmerged(copy), findHiddenEdit(copy));
     Finding yielding;
     bool mayBeRenamed = false;
     for (const OwnedHandle<git_tree> &before : bases)

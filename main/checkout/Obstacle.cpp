@@ -42,6 +42,11 @@ Obstacle inChangedFolder(const std::string &name, Standing standing)
     return {name, what + ("'" + name) + "' is in a folder that becomes a file"};
 }
 
+Obstacle stagedChangesOf(const std::string &name)
+{
+    return {name, "the staged changes of '" + name + "' would be lost in the checkout"};
+}
+
 int reportConflict(const Obstacle &obstacle)
 {
     git_error_set_str(GIT_ERROR_CHECKOUT, obstacle.text.c_str());

@@ -26,6 +26,9 @@ Obstacle inTheWay(const std::string &name, Standing standing);
 /// The same in a folder that becomes a file.
 Obstacle inChangedFolder(const std::string &name, Standing standing);
 
+/// What is staged would be overwritten.
+Obstacle stagedChangesOf(const std::string &name);
+
 /// Makes the text libgit2's last error, and returns GIT_ECONFLICT, for a callback.
 int reportConflict(const Obstacle &obstacle);
 

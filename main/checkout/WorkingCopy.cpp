@@ -15,8 +15,6 @@
 #include "error/errorUtil/GitResult.hpp"
 #include "main/checkout/RemadeFiles.hpp"
 #include "main/checkout/gitlinks.hpp"
-#include "main/checkout/negatedPatterns.hpp"
-#include "util/repository/objectIds.hpp"
 #include "util/repository/repository.hpp"
 
 namespace vclink::git
@@ -72,11 +70,28 @@ bool WorkingCopy::hasHeadMoved() const
 
 Standing WorkingCopy::at(const std::string &name)
 {
-    return wayTo(name).standing == Standing::Folder ? standingAt(pathOf(name)) : Standing::Nothing;
+    const std::string &path = pathOf(name);
+    isKnown_ = true;
+    if (wayTo(name).standing != Standing::Folder)
+    {
+        status_ = {};
+        return Standing::Nothing;
+    }
+    return standingAt(path, status_);
+}
+
+const struct stat &WorkingCopy::statusOf(const std::string &name)
+{
+    if (!isKnown_ || path_.compare(root_.size(), std::string::npos, name) != 0)
+    {
+        at(name);
+    }
+    return status_;
 }
 
 const std::string &WorkingCopy::pathOf(const std::string &name)
 {
+    isKnown_ = false;
     path_.replace(root_.size(), std::string::npos, name);
     return path_;
 }
@@ -150,6 +165,7 @@ void WorkingCopy::forget()
     asked_.clear();
     examined_.reset();
     hasHidden_.reset();
+    isKnown_ = false;
 }
 
 WorkingCopy::Way WorkingCopy::wayInto(const std::string &folder, const Way &above) const
@@ -325,57 +341,6 @@ std::string WorkingCopy::stagedBelow(const std::string &folder) const
         }
     }
     return {};
-}
-
-bool WorkingCopy::isIgnored(const std::string &name) const
-{
-    return isIgnoredByLibGit2(name) && !mayBeNegated(repository_, root_, name);
-}
-
-bool WorkingCopy::isFalselyIgnored(const std::string &name) const
-{
-    return isIgnoredByLibGit2(name) && mayBeNegated(repository_, root_, name);
-}
-
-bool WorkingCopy::isIgnoredByLibGit2(const std::string &name) const
-{
-    int ignored = 0;
-    check(git_ignore_path_is_ignored, &ignored, repository_, name.c_str());
-    return ignored != 0;
-}
-
-bool WorkingCopy::isEdited(const git_index_entry &entry)
-{
-    const std::string name = entry.path;
-    if (!wayTo(name).blocker.empty())
-    {
-        return true;
-    }
-    const Standing standing = at(name);
-    if (standing == Standing::File || standing == Standing::Link)
-    {
-        const git_oid id = idOf(name, standing);
-        return S_ISLNK(entry.mode) != (standing == Standing::Link) || !isSameId(id, entry.id);
-    }
-    return standing == Standing::Special || (standing == Standing::Folder && holdsFiles(name));
-}
-
-/// Returns the id of the file as git would store it.
-git_oid WorkingCopy::idOf(const std::string &name, Standing standing) const
-{
-    git_oid id{};
-    const std::string path = root_ + name;
-    if (standing == Standing::Link)
-    {
-        const std::string target = readLink(path);
-        check(git_odb_hash, &id, target.data(), target.size(), GIT_OBJECT_BLOB);
-    }
-    else
-    {
-        check(git_repository_hashfile, &id, repository_, path.c_str(), GIT_OBJECT_BLOB,
-              name.c_str());
-    }
-    return id;
 }
 
 /// Returns GIT_OBJECT_INVALID if HEAD does not have the name.

@@ -9,6 +9,7 @@
 #include <git2/index.h>
 #include <git2/object.h>
 #include <git2/types.h>
+#include <sys/stat.h>
 
 #include "error/errorUtil/OwnedHandle.hpp"
 #include "main/checkout/standing.hpp"
@@ -49,6 +50,10 @@ class WorkingCopy
 
     /// Returns what is at a name: nothing if something above it is not a folder.
     Standing at(const std::string &name);
+    /// Returns what lstat says of the name; zeros for nothing. Remembers what at() has seen last.
+    const struct stat &statusOf(const std::string &name);
+    /// Returns false if the process may not read the file.
+    [[nodiscard]] bool isReadable(const std::string &name);
     /// See vclink::git::holdsFiles.
     bool holdsFiles(const std::string &folder) const;
 
@@ -103,7 +108,9 @@ class WorkingCopy
     std::string stagedBelow(const std::string &folder) const;
     /// Returns true if Git ignores the name, and no pattern may exempt it. See mayBeNegated.
     bool isIgnored(const std::string &name) const;
-    /// Returns true if libgit2 ignores the name, and Git may not. git_ignore_path_is_ignored.
+    /// Returns true if libgit2 ignores the name. git_ignore_path_is_ignored.
+    [[nodiscard]] bool isIgnoredByLibGit2(const std::string &name) const;
+    /// Returns true if libgit2 ignores the name, and Git may not.
     bool isFalselyIgnored(const std::string &name) const;
     /// Returns true if the content of the file, link or folder differs from its entry in the index.
     /// A missing file does not differ.
@@ -116,7 +123,6 @@ class WorkingCopy
     git_object_t typeInHead(const std::string &name) const;
     const Way &findWay(const std::string &name);
     Way wayInto(const std::string &folder, const Way &above) const;
-    bool isIgnoredByLibGit2(const std::string &name) const;
     git_oid idOf(const std::string &name, Standing standing) const;
 
     git_repository *repository_;
@@ -138,6 +144,9 @@ class WorkingCopy
     std::optional<bool> hasHidden_;
     /// The root, and a name.
     std::string path_;
+    /// Of that path, if isKnown_.
+    struct stat status_ = {};
+    bool isKnown_ = false;
     /// The folder that was examined last, and what came out.
     std::optional<std::string> examined_;
     std::string unwritable_;

@@ -45,27 +45,36 @@ bool matchesAnElement(const std::string &pattern, const std::string &name)
     return false;
 }
 
+/// A name, and whether it is that of a link.
+struct Name
+{
+    const std::string &path;
+    bool isLink;
+};
+
 /// Whether libgit2 takes the line for another pattern than git does. It removes tabs at the end,
 /// and stops at a form feed; git does neither, and the pattern then hardly ever matches anything.
-bool isReadOtherwise(const std::string &line)
+/// It takes a link to a folder for a folder.
+bool isReadOtherwise(const std::string &line, bool isLink)
 {
     const auto last = line.find_last_not_of(" \r");
     return line.find_first_of("\v\f") != std::string::npos ||
-           (last != std::string::npos && line[last] == '\t');
+           (last != std::string::npos && (line[last] == '\t' || (isLink && line[last] == '/')));
 }
 
-bool isDoubtful(const std::string &line, const std::string &name)
+bool isDoubtful(const std::string &line, const Name &name)
 {
     const bool isNegated = !line.empty() && line.front() == '!';
-    if (!isNegated && !isReadOtherwise(line))
+    if (!isNegated && !isReadOtherwise(line, name.isLink))
     {
         return false;
     }
     const std::string pattern = line.substr(isNegated ? 1 : 0);
-    return matchesAnElement(lastElement(pattern.substr(0, pattern.find_first_of("\v\f"))), name);
+    return matchesAnElement(lastElement(pattern.substr(0, pattern.find_first_of("\v\f"))),
+                            name.path);
 }
 
-bool mayNegate(const std::string &path, const std::string &name)
+bool mayNegate(const std::string &path, const Name &name)
 {
     std::ifstream file(path);
     if (!file)
@@ -105,7 +114,7 @@ std::string excludesFile(git_repository *repository)
 }
 
 /// git does not follow a link in the working tree.
-bool mayNegateInTree(const std::string &path, const std::string &name)
+bool mayNegateInTree(const std::string &path, const Name &name)
 {
     return standingAt(path) == Standing::Link || mayNegate(path, name);
 }
@@ -120,23 +129,24 @@ std::string inEnvironment(const char *variable, const char *path)
 
 bool mayBeNegated(git_repository *repository, const std::string &root, const std::string &name)
 {
+    const Name named{name, standingAt(root + name) == Standing::Link};
     for (const std::string &path :
          {git_repository_commondir(repository) + std::string("info/exclude"),
           excludesFile(repository), inEnvironment("XDG_CONFIG_HOME", "/git/ignore"),
           inEnvironment("HOME", "/.config/git/ignore")})
     {
-        if (!path.empty() && mayNegate(path, name))
+        if (!path.empty() && mayNegate(path, named))
         {
             return true;
         }
     }
-    if (mayNegateInTree(root + ".gitignore", name))
+    if (mayNegateInTree(root + ".gitignore", named))
     {
         return true;
     }
     for (auto end = name.find('/'); end != std::string::npos; end = name.find('/', end + 1))
     {
-        if (mayNegateInTree(root + name.substr(0, end) + "/.gitignore", name))
+        if (mayNegateInTree(root + name.substr(0, end) + "/.gitignore", named))
         {
             return true;
         }

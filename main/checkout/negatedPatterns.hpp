@@ -12,7 +12,8 @@ namespace vclink::git
 /// does not apply such a pattern unless it negates another one of the same file, so that it takes
 /// untracked files for ignored ones. Also returns true if a file with patterns cannot be read, or
 /// is a symbolic link in the working tree, which git does not follow, or has a pattern that has
-/// another meaning in git, such as one with a tab at its end.
+/// another meaning in git, such as one with a tab
+/// at its end, or one that ends with '/' for a link.
 /// @param root the working tree, with a slash at its end
 /// @param name relative to the root
 /// @throws LibGit2Exception if the setting `core.excludesFile` cannot be read

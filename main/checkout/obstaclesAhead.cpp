@@ -32,11 +32,6 @@ bool isLink(const git_tree_entry *entry)
     return git_tree_entry_filemode(entry) == GIT_FILEMODE_LINK;
 }
 
-Obstacle stagedChangesOf(const std::string &name)
-{
-    return {name, "the staged changes of '" + name + "' would be lost in the checkout"};
-}
-
 } // namespace
 
 Finding findBlockedWay(WorkingCopy &copy, const TreeChange &change)
@@ -311,6 +306,21 @@ bool isDeletedByBoth(WorkingCopy &copy, const TreeChange &change)
 {
     return change.before != nullptr && !isGitlink(change.before) && change.after == nullptr &&
            copy.entryOf(change.path) == nullptr;
+}
+
+Finding findUnmerged(const WorkingCopy &copy)
+{
+    const std::size_t count = git_index_entrycount(copy.index());
+    for (std::size_t i = 0; i < count; ++i)
+    {
+        const git_index_entry *const entry = git_index_get_byindex(copy.index(), i);
+        if (GIT_INDEX_ENTRY_STAGE(entry) != GIT_INDEX_STAGE_NORMAL)
+        {
+            const std::string name = entry->path;
+            return Obstacle{name, "'" + name + "' is in conflict: resolve it before the merge"};
+        }
+    }
+    return {};
 }
 
 Finding findHiddenEdit(WorkingCopy &copy)

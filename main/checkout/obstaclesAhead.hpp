@@ -90,6 +90,9 @@ Finding findYielding(WorkingCopy &copy, const TreeChange &change);
 /// Returns true if neither side has the file any more. If they have renamed it, it is in conflict,
 /// and libgit2 writes the file of the new name without reporting it.
 bool isDeletedByBoth(WorkingCopy &copy, const TreeChange &change);
+/// Returns the first file in conflict, for example of a `git stash pop`: no merge is under way, and
+/// libgit2 would leave the conflict out of the index, and delete a file that HEAD does not have.
+Finding findUnmerged(const WorkingCopy &copy);
 /// Returns the first file with a change that Git hides because the file is marked skip-worktree or
 /// assume-unchanged. A merge would undo the change, even if the other side does not touch the file.
 Finding findHiddenEdit(WorkingCopy &copy);

@@ -19,9 +19,15 @@ namespace vclink::git
 Standing standingAt(const std::string &path)
 {
     struct stat status = {};
+    return standingAt(path, status);
+}
+
+Standing standingAt(const std::string &path, struct stat &status)
+{
     if (::lstat(path.c_str(), &status) != 0)
     {
         const int error = errno;
+        status = {};
         if (error != ENOENT && error != ENOTDIR)
         {
             raiseSystemError(error, "could not look at '" + path + "'");

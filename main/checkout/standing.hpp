@@ -4,6 +4,8 @@
 #include <functional>
 #include <string>
 
+#include <sys/stat.h>
+
 namespace vclink::git
 {
 
@@ -21,6 +23,9 @@ enum class Standing
 /// @param path absolute
 /// @throws LibGit2Exception if it cannot be found out
 Standing standingAt(const std::string &path);
+
+/// @param status receives what lstat says; zeros for nothing
+Standing standingAt(const std::string &path, struct stat &status);
 
 /// Returns true if this is a folder that contains anything except folders, at any depth, or that
 /// cannot be read.

@@ -13,6 +13,7 @@
 #include <strings.h>
 #include <sys/stat.h>
 
+#include "util/repository/entryStatus.hpp"
 #include "util/repository/objectIds.hpp"
 
 namespace vclink::git
@@ -37,14 +38,6 @@ std::uint32_t modeOf(const struct stat &status)
 bool isFile(std::uint32_t mode)
 {
     return mode == GIT_FILEMODE_BLOB || mode == GIT_FILEMODE_BLOB_EXECUTABLE;
-}
-
-/// Some programs write an index without fractions of seconds.
-bool isSameTime(const git_index_time &noted, const timespec &time)
-{
-    return noted.seconds == static_cast<std::int32_t>(time.tv_sec) &&
-           (noted.nanoseconds == 0 ||
-            noted.nanoseconds == static_cast<std::uint32_t>(time.tv_nsec));
 }
 
 bool isEmptyFile(const struct stat &status)

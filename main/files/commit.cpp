@@ -22,6 +22,7 @@
 #include "main/mergeState/MergeMarker.hpp"
 #include "main/mergeState/interruptedMerge.hpp"
 #include "main/mergeState/mergeHead.hpp"
+#include "main/mergeState/unfinishedOperation.hpp"
 #include "util/lock/IndexLock.hpp"
 #include "util/lock/referenceLocks.hpp"
 #include "util/repository/repository.hpp"
@@ -103,13 +104,17 @@ void GitAdapter::commit(const upath & /*folder*/, const ustring &message)
     {
         refuseOtherParents(*expectedMerge_, parents);
     }
-    else if (headCommit != nullptr && mergeHeads.size() == 1)
-    {
-        refuseInterruptedMerge(repository.get(), parents.front(), parents.back());
-    }
     else if (state == GIT_REPOSITORY_STATE_NONE)
     {
         removeMergeMarker(repository.get());
+    }
+    else
+    {
+        refuseCommitWithAutostash(repository.get());
+    }
+    if (expectedMerge_ == nullptr && headCommit != nullptr && mergeHeads.size() == 1)
+    {
+        refuseInterruptedMerge(repository.get(), parents.front(), parents.back());
     }
     createCommit(repository.get(), message, headCommit, parents, lock);
     expectMerge(nullptr);

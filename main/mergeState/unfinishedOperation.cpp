@@ -2,11 +2,13 @@
 #include "main/mergeState/unfinishedOperation.hpp"
 
 #include <array>
+#include <cerrno>
 #include <fstream>
 #include <string>
 
 #include <git2/errors.h>
 #include <git2/repository.h>
+#include <unistd.h>
 
 #include "error/errorUtil/GitResult.hpp"
 #include "error/errorUtil/raiseGitError.hpp"
@@ -69,6 +71,24 @@ void refuseSwitchInUnfinishedOperation(git_repository *repository)
         raiseGitError(GIT_ECONFLICT, GIT_ERROR_CHECKOUT,
                       std::string("cannot switch branches while ") + operation +
                           " is under way: conclude or abort it first, see git status");
+    }
+}
+
+void refuseCommitWithAutostash(git_repository *repository)
+{
+    const std::string folder = git_repository_path(repository);
+    for (const char *const file :
+         {"MERGE_AUTOSTASH", "rebase-merge/autostash", "rebase-apply/autostash"})
+    {
+        // If it cannot be examined, it may exist.
+        if (::access((folder + file).c_str(), F_OK) == 0 || (errno != ENOENT && errno != ENOTDIR))
+        {
+            raiseGitError(
+                GIT_ERROR, GIT_ERROR_REPOSITORY,
+                "'git merge' or 'git rebase' has put uncommitted changes aside (--autostash), "
+                "and only git brings them back: conclude it with 'git commit' or 'git rebase "
+                "--continue'");
+        }
     }
 }
 

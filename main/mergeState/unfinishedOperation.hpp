@@ -12,6 +12,12 @@ namespace vclink::git
 /// @throws LibGit2Exception also if the state cannot be read
 void refuseSwitchInUnfinishedOperation(git_repository *repository);
 
+/// Throws if git has put changes of the user aside for the merge or rebase that is under way, with
+/// --autostash. git brings them back when it concludes the operation; after another conclusion only
+/// `git fsck` would find them.
+/// @throws LibGit2Exception
+void refuseCommitWithAutostash(git_repository *repository);
+
 /// Throws if a rebase or bisection in this working copy returns to the branch: without it, it could
 /// not be concluded.
 /// @param reference the full name of the branch

@@ -9,6 +9,7 @@
 namespace
 {
 
+using testing::ElementsAre;
 using testing::IsEmpty;
 using namespace vclink::test;
 
@@ -48,6 +49,19 @@ TEST_F(MergeEdits, AreRefusedWithTheFirstName)
     repository_.git({"update-index", "--skip-worktree", "other"});
     repository_.write("other", "mine\n");
     expectMergeRefused(inTheWay("untracked file 'd/new'"));
+}
+
+/// libgit2 would forget the conflict, and delete a file that HEAD does not have.
+TEST_F(MergeEdits, InConflictAreRefusedWithoutAMergeUnderWay)
+{
+    theyWrite({"theirs"});
+    repository_.write("other", "mine\n");
+    repository_.git({"stash"});
+    repository_.commitAll(removes("other"), "ours, too");
+    EXPECT_FALSE(repository_.tryGit({"stash", "pop"}).succeeded());
+    ASSERT_THAT(status(), ElementsAre("DU other"));
+    expectMergeRefused(refusal("'other' is in conflict: resolve it before the merge"));
+    EXPECT_EQ(repository_.read("other"), "mine\n");
 }
 
 TEST_F(MergeEdits, AreNotMissingFilesWhichComeBack)

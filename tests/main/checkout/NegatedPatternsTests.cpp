@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "main/checkout/negatedPatterns.hpp"
 
+#include <filesystem>
 #include <fstream>
 #include <string>
 
@@ -103,6 +104,17 @@ INSTANTIATE_TEST_SUITE_P(In, LinkedPatterns, testing::Values(".gitignore", "d/.g
 class IgnoredFiles : public ObstacleFixture
 {
 };
+
+/// libgit2 follows the link, and takes it for a folder.
+TEST_F(IgnoredFiles, AreNotLinksInThePlaceOfAnIgnoredFolder)
+{
+    ignore("build/");
+    diverge(writes("ours", "x"),
+            writes("build/x", "theirs\n") + runsGit({"add", "--force", "build"}));
+    repository_.symlink(outside_.path().string(), "build");
+    expectMergeRefused(inTheWay("symbolic link 'build'"));
+    EXPECT_TRUE(std::filesystem::is_symlink(repository_ / "build"));
+}
 
 TEST_F(IgnoredFiles, AreNotKeptBecauseAnotherNameIsExcepted)
 {

@@ -3,10 +3,12 @@
 #include <string>
 #include <vector>
 
+#include <git2/errors.h>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include "main/files/CommitFixture.hpp"
+#include "support/RepositoryState.hpp"
 #include "support/Sentence.hpp"
 
 namespace
@@ -161,6 +163,49 @@ TEST_F(StateConclusion, EndsARebaseAndAMergeInItWithOneParent)
     repository_.write(".git/MERGE_HEAD", idOf("main") + '\n');
     expectEnds({"rebase-merge", "MERGE_HEAD", "MERGE_MSG"});
 }
+
+/// Only git would bring them back.
+class PutAside : public StateConclusion,
+                 public testing::WithParamInterface<std::vector<std::string>>
+{
+};
+
+TEST_P(PutAside, ChangesOfTheUserKeepACommitFromEndingTheOperation)
+{
+    repository_.commitAll(writes("other", "other\n"), "another file");
+    repository_.write("other", "mine\n");
+    stopAt(GetParam());
+    repository_.write("file", "resolved\n");
+    repository_.git({"add", "file"});
+    const NothingChanges nothing(repository_);
+    const Failure failure{
+        GIT_ERROR, GIT_ERROR_REPOSITORY,
+        "'git merge' or 'git rebase' has put uncommitted changes aside (--autostash), and only git "
+        "brings them back: conclude it with 'git commit' or 'git rebase --continue'"};
+    EXPECT_EQ(failureOf([this] { commit(); }), failure);
+}
+
+TEST_P(PutAside, ChangesOfTheUserComeBackWithGit)
+{
+    repository_.commitAll(writes("other", "other\n"), "another file");
+    repository_.write("other", "mine\n");
+    stopAt(GetParam());
+    repository_.write("file", "resolved\n");
+    repository_.git({"add", "file"});
+    if (GetParam().front() == "merge")
+        repository_.git({"commit", "--quiet", "--no-edit"});
+    else
+        repository_.git({"-c", "core.editor=true", "rebase", "--continue"});
+    EXPECT_EQ(repository_.read("other"), "mine\n");
+    commit();
+    EXPECT_EQ(committed("other"), "mine\n");
+}
+
+INSTANTIATE_TEST_SUITE_P(
+    By, PutAside,
+    testing::Values(std::vector<std::string>{"merge", "--autostash", "theirs"},
+                    std::vector<std::string>{"rebase", "--autostash", "theirs"},
+                    std::vector<std::string>{"rebase", "--apply", "--autostash", "theirs"}));
 
 TEST_F(StateConclusion, LeavesWhatIsLeftOfAFormerMergeAlone)
 {

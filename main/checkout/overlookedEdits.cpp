@@ -1,0 +1,78 @@
+// SPDX-License-Identifier: MIT
+#include "main/checkout/overlookedEdits.hpp"
+
+#include <cstdint>
+#include <string>
+
+#include <sys/stat.h>
+
+#include "main/checkout/gitlinks.hpp"
+#include "util/repository/entryStatus.hpp"
+
+namespace vclink::git
+{
+namespace
+{
+
+/// All that libgit2's checkout compares before it compares the content.
+bool hasSizeAndTimeOf(const git_index_entry &entry, const struct stat &status)
+{
+    return entry.file_size == static_cast<std::uint32_t>(status.st_size) &&
+           isSameTime(entry.mtime, status.st_mtim);
+}
+
+bool hasInodeOf(const git_index_entry &entry, const struct stat &status)
+{
+    return entry.ino == static_cast<std::uint32_t>(status.st_ino) &&
+           isSameTime(entry.ctime, status.st_ctim);
+}
+
+} // namespace
+
+Finding findOverlookedEdit(WorkingCopy &copy, const TreeChange &change)
+{
+    const git_index_entry *const entry = copy.entryOf(change.path);
+    if (entry == nullptr || isGitlink(entry))
+    {
+        return {};
+    }
+    const struct stat &status = copy.statusOf(change.path);
+    const bool isAsLibGit2Sees = hasSizeAndTimeOf(*entry, status);
+    if (isAsLibGit2Sees && hasInodeOf(*entry, status))
+    {
+        return {};
+    }
+    if (S_ISREG(status.st_mode) && !copy.isReadable(change.path))
+    {
+        return Obstacle{change.path, "'" + change.path +
+                                         "' cannot be read, and its changes would be lost in the "
+                                         "checkout"};
+    }
+    if (isAsLibGit2Sees && copy.isEdited(*entry))
+    {
+        return Obstacle{change.path, "the uncommitted changes of '" + change.path +
+                                         "' would be lost in the checkout"};
+    }
+    return {};
+}
+
+Finding findStagedThoughIgnored(WorkingCopy &copy, const TreeChange &change)
+{
+    if (change.before != nullptr || change.after == nullptr)
+    {
+        return {};
+    }
+    const Standing standing = copy.at(change.path);
+    const git_index_entry *const entry = copy.entryOf(change.path);
+    const bool isStaged =
+        entry != nullptr && (!isOf(*entry, change.after) || copy.isEdited(*entry));
+    const bool isLost = standing == Standing::Folder ? !copy.stagedBelow(change.path).empty()
+                                                     : standing != Standing::Nothing && isStaged;
+    if (!isLost || !copy.isIgnoredByLibGit2(change.path))
+    {
+        return {};
+    }
+    return stagedChangesOf(change.path);
+}
+
+} // namespace vclink::git

@@ -1,0 +1,21 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include "main/checkout/Obstacle.hpp"
+#include "main/checkout/WorkingCopy.hpp"
+#include "main/checkout/treeChanges.hpp"
+
+/// The rules of a switch or a fast-forward for changes of the user that libgit2 would overwrite,
+/// because it takes the file for unchanged or ignored.
+namespace vclink::git
+{
+
+/// Finds a tracked file with a change that libgit2 does not see: it compares only the size and the
+/// time of the last change, and takes a file that it cannot read for an unchanged one. git also
+/// compares the inode and the time at which that changed.
+Finding findOverlookedEdit(WorkingCopy &copy, const TreeChange &change);
+
+/// Finds a file that is in the index although it is ignored, in the place of a new file or folder.
+Finding findStagedThoughIgnored(WorkingCopy &copy, const TreeChange &change);
+
+} // namespace vclink::git

@@ -1,0 +1,149 @@
+// SPDX-License-Identifier: MIT
+#include "main/checkout/overlookedEdits.hpp"
+
+#include <array>
+#include <string>
+
+#include <fcntl.h>
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+#include <sys/stat.h>
+
+#include "ObstacleFixture.hpp"
+
+namespace
+{
+
+using testing::IsEmpty;
+using namespace vclink::test;
+
+/// Changes of the user that libgit2 takes for none, in the way of a switch and a fast-forward.
+class OverlookedEdits : public ObstacleFixture
+{
+  protected:
+    void expectRefused(const Failure &failure) const override
+    {
+        expectSwitchRefused(failure);
+        expectMergeRefused(failure);
+    }
+    void expectRefusedUnprivileged(const std::string &name, mode_t mode,
+                                   const Failure &failure) const
+    {
+        EXPECT_EQ(runUnprivileged(
+                      name, mode,
+                      [this]
+                      { return failureOf([this] { branches().switchBranch("topic"); }).text; }),
+                  failure.text);
+        EXPECT_EQ(runUnprivileged(name, mode, [this] { return failureOfMerge("topic"); }),
+                  textOf(failure));
+    }
+};
+
+/// As a program does that restores times: the content differs, size and time do not.
+Change writesAtTheSameTime(const std::string &name, const std::string &bytes)
+{
+    return [=](const GitRepository &copy)
+    {
+        struct stat before = {};
+        ASSERT_EQ(::stat((copy / name).c_str(), &before), 0);
+        ASSERT_EQ(static_cast<std::size_t>(before.st_size), bytes.size());
+        copy.write(name, bytes);
+        const std::array<timespec, 2> times{before.st_atim, before.st_mtim};
+        ASSERT_EQ(::utimensat(AT_FDCWD, (copy / name).c_str(), times.data(), 0), 0);
+    };
+}
+
+Change setsAnOldTime(const std::string &name)
+{
+    return [=](const GitRepository &copy)
+    {
+        const std::array<timespec, 2> times{timespec{1'000'000'000, 0}, timespec{1'000'000'000, 0}};
+        ASSERT_EQ(::utimensat(AT_FDCWD, (copy / name).c_str(), times.data(), 0), 0);
+    };
+}
+
+Failure lost(const std::string &name)
+{
+    return refusal("the uncommitted changes of '" + name + "' would be lost in the checkout");
+}
+
+TEST_F(OverlookedEdits, OfTheSameSizeAndTimeAreKept)
+{
+    makeBranch("topic", writes("d/f", "t\n") + removes("d/g"));
+    for (const std::string name : {"d/f", "d/g"})
+    {
+        SCOPED_TRACE(name);
+        setsAnOldTime(name)(repository_);
+        repository_.git({"update-index", "--refresh"});
+        writesAtTheSameTime(name, "M\n")(repository_);
+        expectRefused(lost(name));
+        repository_.git({"checkout", "--quiet", "--force", "HEAD", "--", name});
+        writes(name, name == "d/f" ? "f\n" : "g\n")(repository_);
+    }
+    expectSwitches();
+    EXPECT_THAT(status(), IsEmpty());
+}
+
+TEST_F(OverlookedEdits, AreNotOtherInodesWithTheSameContent)
+{
+    makeBranch("topic", writes("d/f", "t\n") + removes("d/g"));
+    for (const std::string name : {"d/f", "d/g"})
+    {
+        setsAnOldTime(name)(repository_);
+        repository_.git({"update-index", "--refresh"});
+        const std::string content = repository_.read(name);
+        repository_.remove(name);
+        repository_.write(name, content);
+        setsAnOldTime(name)(repository_);
+    }
+    expectSwitches();
+    EXPECT_THAT(status(), IsEmpty());
+}
+
+TEST_F(OverlookedEdits, OfFilesThatCannotBeReadAreKept)
+{
+    makeBranch("topic", writes("d/f", "theirs\n") + removes("d/g"));
+    for (const std::string name : {"d/f", "d/g"})
+    {
+        SCOPED_TRACE(name);
+        const std::string before = repository_.read(name);
+        repository_.write(name, "mine\n");
+        expectRefusedUnprivileged(
+            name, 0200,
+            refusal("'" + name +
+                    "' cannot be read, and its changes would be lost in the checkout"));
+        EXPECT_EQ(repository_.read(name), "mine\n");
+        repository_.write(name, before);
+    }
+}
+
+/// Staged, in the place of what the other branch adds.
+TEST_F(OverlookedEdits, OfStagedFilesThatAreIgnoredAreKept)
+{
+    ignore("*.log\nlogs");
+    makeBranch("topic", writesEach({"x.log", "logs"}, "theirs\n") +
+                            runsGit({"add", "--force", "x.log", "logs"}));
+    const Change adds = writes("x.log", "mine\n") + runsGit({"add", "--force", "x.log"});
+    adds(repository_);
+    expectRefused(staged("x.log"));
+    repository_.git({"reset", "--quiet"});
+    (writes("x.log", "theirs\n") + runsGit({"add", "--force", "x.log"}) +
+     writes("x.log", "mine\n"))(repository_);
+    expectRefused(staged("x.log"));
+    EXPECT_EQ(repository_.read("x.log"), "mine\n");
+    repository_.git({"rm", "--quiet", "--force", "x.log"});
+    (writes("logs/mine", "mine\n") + runsGit({"add", "--force", "logs/mine"}))(repository_);
+    expectRefused(staged("logs"));
+    EXPECT_EQ(repository_.read("logs/mine"), "mine\n");
+}
+
+TEST_F(OverlookedEdits, AreNotStagedFilesThatTheBranchHasAsWell)
+{
+    ignore("*.log");
+    makeBranch("topic", writes("x.log", "theirs\n") + runsGit({"add", "--force", "x.log"}));
+    (writes("x.log", "theirs\n") + runsGit({"add", "--force", "x.log"}))(repository_);
+    expectSwitches();
+    EXPECT_THAT(status(), IsEmpty());
+}
+
+} // namespace
