@@ -1,7 +1,9 @@
 // SPDX-License-Identifier: MIT
 #include "main/checkout/RenamesToFolders.hpp"
 
+#include <algorithm>
 #include <cstddef>
+#include <iterator>
 #include <limits>
 #include <memory>
 
@@ -89,8 +91,8 @@ Finding findRenameTo(git_repository *repository, git_tree *before, git_tree *aft
         if (isBelow(folders, name))
         {
             return Obstacle{name, "'" + name +
-                                      "' is a renamed file of one side, in a folder that is a "
-                                      "changed file of the other: merge with 'git merge'"};
+                                      "' is a renamed file of one side, in a folder that is a file "
+                                      "of the other: merge with 'git merge'"};
         }
     }
     return {};
@@ -164,9 +166,16 @@ Finding RenamesToFolders::find(git_repository *repository, const WorkingCopy &co
             files.insert(file);
         }
     }
-    Finding found = findRenameTo(repository, before, theirs, files, foldersOfTheirs_);
+    std::set<std::string> foldersOfOurs = foldersOfOurs_;
+    std::copy_if(files.begin(), files.end(), std::inserter(foldersOfOurs, foldersOfOurs.end()),
+                 [=](const std::string &file) { return isFolderIn(before, file); });
+    std::set<std::string> foldersOfTheirs = foldersOfTheirs_;
+    std::copy_if(filesOfOurs_.begin(), filesOfOurs_.end(),
+                 std::inserter(foldersOfTheirs, foldersOfTheirs.end()),
+                 [=](const std::string &file) { return isFolderIn(before, file); });
+    Finding found = findRenameTo(repository, before, theirs, files, foldersOfTheirs);
     return found ? found
-                 : findRenameTo(repository, before, copy.head(), filesOfOurs_, foldersOfOurs_);
+                 : findRenameTo(repository, before, copy.head(), filesOfOurs_, foldersOfOurs);
 }
 
 } // namespace vclink::git

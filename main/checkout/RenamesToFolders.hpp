@@ -14,8 +14,8 @@ namespace vclink::git
 {
 
 /// A rule of a merge: finds a file that one side has renamed to the name of a folder in which the
-/// other side has added or changed something, or into a folder whose name is a file that the other
-/// side has changed. libgit2 would fail in the middle of its writing, or merge neither the file nor
+/// other side has added or changed something, into a folder whose name is a file that the other side
+/// has changed, or into a folder that the other side has replaced by a file. libgit2 would fail in the middle of its writing, or merge neither the file nor
 /// the folder. If the renamed file were a new one, libgit2 would have a conflict.
 class RenamesToFolders
 {
@@ -38,7 +38,7 @@ class RenamesToFolders
 
     std::set<std::string> filesOfOurs_;
     std::set<std::string> filesOfTheirs_;
-    /// In the place of a file that the other side has changed.
+    /// In the place of a file of the merge base that the other side has changed.
     std::set<std::string> foldersOfOurs_;
     std::set<std::string> foldersOfTheirs_;
     /// The folder whose parents were looked up last: names come in the order of folders.

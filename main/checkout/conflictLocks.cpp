@@ -2,6 +2,7 @@
 #include "main/checkout/conflictLocks.hpp"
 
 #include <algorithm>
+#include <cstddef>
 #include <memory>
 #include <string>
 #include <utility>
@@ -95,6 +96,15 @@ Obstacle takenForRenamed(const std::string &path, const std::string &other)
                       "', which is empty too: merge with 'git merge'"};
 }
 
+/// libgit2 takes the first of them for the renamed one, git the one that keeps its last name.
+Obstacle amongSameContents(const std::string &path)
+{
+    return {path,
+            "one side has changed '" + path + "' and the other has deleted or renamed it and " +
+                "another file with the same content, and the change would go to any file of " +
+                "this content: merge with 'git merge'"};
+}
+
 Obstacle besideLock(const std::string &path)
 {
     return {path, "the conflict in '" + path + "' cannot be written beside '" + path +
@@ -158,6 +168,25 @@ Finding RenamedLocks::find(git_repository *repository, WorkingCopy &copy, const 
     return found ? found : findIn(repository, copy, before, theirs, theirs, deletedByTheirs_);
 }
 
+void RenamedLocks::noteMoves(std::vector<Moves> &moves, const std::vector<Candidate> &candidates,
+                             const TreeChange &change)
+{
+    if ((change.before == nullptr) == (change.after == nullptr))
+    {
+        return;
+    }
+    const bool isAdded = change.before == nullptr;
+    const git_oid &id = *git_tree_entry_id(isAdded ? change.after : change.before);
+    for (std::size_t i = 0; i < candidates.size(); ++i)
+    {
+        if (isSameId(id, candidates[i].before.id))
+        {
+            moves[i].isAdded = moves[i].isAdded || isAdded;
+            moves[i].deleted += isAdded ? 0U : 1U;
+        }
+    }
+}
+
 Finding RenamedLocks::findIn(git_repository *repository, WorkingCopy &copy, const git_tree *before,
                              const git_tree *renaming, const git_tree *theirs,
                              const std::vector<Candidate> &candidates)
@@ -194,9 +223,11 @@ Finding RenamedLocks::findIn(git_repository *repository, WorkingCopy &copy, cons
     const auto emptied =
         std::find_if(candidates.begin(), candidates.end(),
                      [](const Candidate &candidate) { return isEmptyBlob(candidate.before.id); });
+    std::vector<Moves> moves(candidates.size());
     visitTreeChanges(repository, before, renaming,
                      [&](const TreeChange &change)
                      {
+                         noteMoves(moves, candidates, change);
                          const bool isAdded = change.before == nullptr && change.after != nullptr &&
                                               !isGitlink(change.after);
                          if (isAdded && emptied != candidates.end() &&
@@ -213,6 +244,14 @@ Finding RenamedLocks::findIn(git_repository *repository, WorkingCopy &copy, cons
                          }
                          return !found;
                      });
+    const auto unclear =
+        std::find_if(moves.begin(), moves.end(),
+                     [](const Moves &each) { return each.deleted > 1 && each.isAdded; });
+    if (!found && unclear != moves.end())
+    {
+        found = amongSameContents(
+            candidates[static_cast<std::size_t>(unclear - moves.begin())].before.path);
+    }
     return found;
 }
 

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include <cstddef>
 #include <string>
 #include <vector>
 
@@ -30,7 +31,8 @@ Finding findLockBesideFile(WorkingCopy &copy, const TreeChange &change, const gi
 
 /// The same rule for a file that one side has renamed and the other has changed. There it also
 /// finds folders that cannot be written to, because libgit2 removes the file and
-/// creates it again.
+/// creates it again, and files that libgit2 may take for the renamed one by mistake: empty ones,
+/// and several with the same content.
 class RenamedLocks
 {
   public:
@@ -56,6 +58,14 @@ class RenamedLocks
         File before;
         File changed;
     };
+    /// What one side has done with files of a candidate's content.
+    struct Moves
+    {
+        std::size_t deleted = 0;
+        bool isAdded = false;
+    };
+    static void noteMoves(std::vector<Moves> &moves, const std::vector<Candidate> &candidates,
+                          const TreeChange &change);
     static Finding findIn(git_repository *repository, WorkingCopy &copy, const git_tree *before,
                           const git_tree *renaming, const git_tree *theirs,
                           const std::vector<Candidate> &candidates);

@@ -15,12 +15,6 @@ namespace vclink::git
 namespace
 {
 
-bool isFolder(const git_tree *tree, const std::string &path)
-{
-    const OwnedTreeEntry entry = findInTree(tree, path);
-    return entry != nullptr && git_tree_entry_type(entry.get()) == GIT_OBJECT_TREE;
-}
-
 using Bases = std::vector<OwnedHandle<git_tree>>;
 
 /// Returns true if all bases have the file as this side has it. Then only the other side has
@@ -45,7 +39,7 @@ Finding findLinkAndFolder(const WorkingCopy &copy, const TreeChange &change, con
     const git_tree *const other = change.before != nullptr ? theirs : copy.head();
     const bool isOneSided = change.before == nullptr || change.after == nullptr;
     if (!isOneSided || git_tree_entry_filemode(link) != GIT_FILEMODE_LINK ||
-        !isFolder(other, change.path))
+        !isFolderIn(other, change.path))
     {
         return {};
     }

@@ -123,6 +123,12 @@ OwnedTreeEntry findInTree(const git_tree *tree, const std::string &path)
     return entry;
 }
 
+bool isFolderIn(const git_tree *tree, const std::string &path)
+{
+    const OwnedTreeEntry entry = findInTree(tree, path);
+    return entry != nullptr && git_tree_entry_type(entry.get()) == GIT_OBJECT_TREE;
+}
+
 void visitTreeChanges(git_repository *repository, const git_tree *before, const git_tree *after,
                       const std::function<bool(const TreeChange &)> &visit)
 {

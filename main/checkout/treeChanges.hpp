@@ -58,6 +58,9 @@ using OwnedTreeEntry = std::unique_ptr<git_tree_entry, FreeTreeEntry>;
 /// @throws LibGit2Exception if a tree on the way cannot be read
 OwnedTreeEntry findInTree(const git_tree *tree, const std::string &path);
 
+/// Returns true if the tree has a folder of this name. See findInTree.
+bool isFolderIn(const git_tree *tree, const std::string &path);
+
 /// Visits what differs, in path order, until `visit` returns false. Does not read equal folders.
 /// git_diff_tree_to_tree returns the same at several times the cost.
 /// @param before, after null means the empty tree

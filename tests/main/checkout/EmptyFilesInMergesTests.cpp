@@ -56,4 +56,43 @@ TEST_F(EmptyFilesInMerges, AreInConflictIfThereIsNoOtherEmptyFile)
     expectConflictsAsGit({"1 a/__init__.py", "3 a/__init__.py"});
 }
 
+/// Two files with the same content, of which one side has renamed at least one, and the other has
+/// changed one. libgit2 takes the first for the renamed one.
+class EqualFilesInMerges : public ObstacleFixture
+{
+  protected:
+    EqualFilesInMerges()
+    {
+        repository_.commitAll(writesEach({"a/x", "b/y"}, "1\n2\n3\n"), "two of the same content");
+    }
+
+    void expectEqualRefused(const std::string &name) const
+    {
+        expectMergeRefused(
+            refusal("one side has changed '" + name +
+                    "' and the other has deleted or renamed it and another file with the same "
+                    "content, and the change would go to any file of this content: merge with "
+                    "'git merge'"));
+    }
+};
+
+TEST_F(EqualFilesInMerges, AreRefusedIfTheChangedOneIsDeleted)
+{
+    diverge(writes("a/x", "1\n2\n3\n4\n"), removes("a/x") + makesFolder("c") + moves("b/y", "c/y"));
+    expectEqualRefused("a/x");
+}
+
+TEST_F(EqualFilesInMerges, AreRefusedIfBothAreRenamed)
+{
+    diverge(makesFolder("c") + moves("b/y", "c/y") + makesFolder("d") + moves("a/x", "d/x"),
+            writes("b/y", "1\n2\n3\n4\n"));
+    expectEqualRefused("b/y");
+}
+
+TEST_F(EqualFilesInMerges, AreMergedIfOnlyTheChangedOneIsRenamed)
+{
+    diverge(writes("b/y", "1\n2\n3\n4\n"), makesFolder("c") + moves("b/y", "c/y"));
+    expectCleanAsGit();
+}
+
 } // namespace

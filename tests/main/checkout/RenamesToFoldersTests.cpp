@@ -34,10 +34,11 @@ class RenamesToFolders : public ObstacleFixture
                                    "' is a renamed file of one side and a folder of "
                                    "the other: merge with 'git merge'"));
     }
-    void expectInsideRefused() const
+    void expectInsideRefused(const std::string &name = "file/inside") const
     {
-        expectMergeRefused(refusal("'file/inside' is a renamed file of one side, in a folder that "
-                                   "is a changed file of the other: merge with 'git merge'"));
+        expectMergeRefused(refusal("'" + name +
+                                   "' is a renamed file of one side, in a folder that is a file of "
+                                   "the other: merge with 'git merge'"));
     }
 };
 
@@ -68,6 +69,20 @@ TEST_F(RenamesToFolders, RefuseTheMergeIfOurFolderIsAFileThatTheyChanged)
     diverge(removes("file") + makesFolder("file") + moves("old", "file/inside"),
             writes("file", "theirs\n"));
     expectInsideRefused();
+}
+
+/// libgit2 would delete the folder's files, and then fail.
+TEST_F(RenamesToFolders, RefuseTheMergeIfTheyReplacedTheFolderByAFile)
+{
+    diverge(moves("old", "d/inside"), removes("d") + writes("d", "theirs\n"));
+    expectInsideRefused("d/inside");
+}
+
+/// libgit2 would leave both files out of the merge.
+TEST_F(RenamesToFolders, RefuseTheMergeIfWeReplacedTheFolderByAFile)
+{
+    diverge(removes("d") + writes("d", "ours\n"), moves("old", "d/inside"));
+    expectInsideRefused("d/inside");
 }
 
 /// libgit2 would leave both files out of the merge.
