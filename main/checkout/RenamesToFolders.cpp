@@ -3,6 +3,7 @@
 
 #include <algorithm>
 #include <cstddef>
+#include <initializer_list>
 #include <iterator>
 #include <limits>
 #include <memory>
@@ -13,6 +14,7 @@
 
 #include "error/errorUtil/GitResult.hpp"
 #include "main/checkout/gitlinks.hpp"
+#include "util/repository/repository.hpp"
 
 namespace vclink::git
 {
@@ -43,13 +45,68 @@ void findRenames(git_diff *diff)
     check(git_diff_find_similar, diff, &options);
 }
 
-/// Returns true if both trees have the folder, with the same content.
-bool isSameFolder(const git_tree *left, const git_tree *right, const std::string &path)
+/// libgit2 sees such a conflict only if the names are next to each other.
+Obstacle besideSibling(const std::string &path, const std::string &sibling)
+{
+    return {path, "'" + path + "' is a file of one side and a folder of the other, beside '" +
+                      sibling + "': merge with 'git merge'"};
+}
+
+/// Returns true if both trees have this file or folder, with the same content.
+bool isSame(const git_tree *left, const git_tree *right, const std::string &path)
 {
     const OwnedTreeEntry leftEntry = findInTree(left, path);
     const OwnedTreeEntry rightEntry = findInTree(right, path);
     return leftEntry != nullptr && rightEntry != nullptr &&
            isSameId(*git_tree_entry_id(leftEntry.get()), *git_tree_entry_id(rightEntry.get()));
+}
+
+/// Returns a name of the same folder that sorts between the path and what is below it, as "lib-1"
+/// and "lib.txt" do for "lib". Empty if there is none.
+std::string siblingIn(git_repository *repository, const git_tree *tree, const std::string &path)
+{
+    const std::size_t start = path.rfind('/') + 1;
+    OwnedHandle<git_tree> parent;
+    if (start > 0)
+    {
+        const OwnedTreeEntry entry = findInTree(tree, path.substr(0, start - 1));
+        if (entry == nullptr || git_tree_entry_type(entry.get()) != GIT_OBJECT_TREE)
+        {
+            return {};
+        }
+        parent = lookupTree(repository, git_tree_entry_id(entry.get()));
+        tree = parent.get();
+    }
+    const std::string name = path.substr(start);
+    const std::size_t count = tree != nullptr ? git_tree_entrycount(tree) : 0;
+    for (std::size_t i = 0; i < count; ++i)
+    {
+        const std::string sibling = git_tree_entry_name(git_tree_entry_byindex(tree, i));
+        const bool isLonger =
+            sibling.size() > name.size() && sibling.compare(0, name.size(), name) == 0;
+        if (isLonger && static_cast<unsigned char>(sibling[name.size()]) < '/')
+        {
+            return path.substr(0, start) + sibling;
+        }
+    }
+    return {};
+}
+
+Finding findSibling(git_repository *repository, std::initializer_list<const git_tree *> trees,
+                    const std::set<std::string> &paths)
+{
+    for (const std::string &path : paths)
+    {
+        for (const git_tree *const tree : trees)
+        {
+            const std::string sibling = siblingIn(repository, tree, path);
+            if (!sibling.empty())
+            {
+                return besideSibling(path, sibling);
+            }
+        }
+    }
+    return {};
 }
 
 bool isBelow(const std::set<std::string> &folders, const std::string &path)
@@ -161,7 +218,7 @@ Finding RenamesToFolders::find(git_repository *repository, const WorkingCopy &co
     std::set<std::string> files;
     for (const std::string &file : filesOfTheirs_)
     {
-        if (!isSameFolder(before, copy.head(), file))
+        if (!isSame(before, copy.head(), file))
         {
             files.insert(file);
         }
@@ -173,7 +230,17 @@ Finding RenamesToFolders::find(git_repository *repository, const WorkingCopy &co
     std::copy_if(filesOfOurs_.begin(), filesOfOurs_.end(),
                  std::inserter(foldersOfTheirs, foldersOfTheirs.end()),
                  [=](const std::string &file) { return isFolderIn(before, file); });
-    Finding found = findRenameTo(repository, before, theirs, files, foldersOfTheirs);
+    std::set<std::string> conflicts = foldersOfOurs;
+    conflicts.insert(files.begin(), files.end());
+    conflicts.insert(foldersOfTheirs.begin(), foldersOfTheirs.end());
+    std::copy_if(filesOfOurs_.begin(), filesOfOurs_.end(),
+                 std::inserter(conflicts, conflicts.end()),
+                 [&](const std::string &file) { return !isSame(before, copy.head(), file); });
+    Finding found = findSibling(repository, {before, copy.head(), theirs}, conflicts);
+    if (!found)
+    {
+        found = findRenameTo(repository, before, theirs, files, foldersOfTheirs);
+    }
     return found ? found
                  : findRenameTo(repository, before, copy.head(), filesOfOurs_, foldersOfOurs);
 }

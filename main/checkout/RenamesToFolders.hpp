@@ -14,9 +14,14 @@ namespace vclink::git
 {
 
 /// A rule of a merge: finds a file that one side has renamed to the name of a folder in which the
-/// other side has added or changed something, into a folder whose name is a file that the other side
-/// has changed, or into a folder that the other side has replaced by a file. libgit2 would fail in the middle of its writing, or merge neither the file nor
-/// the folder. If the renamed file were a new one, libgit2 would have a conflict.
+/// other side has added or changed something, into a folder whose name is a file that the other
+/// side has changed, or into a folder that the other side has replaced by a file. libgit2 would
+/// fail in the middle of its writing, or merge neither the file nor the folder. If the renamed file
+/// were a new one, libgit2 would have a conflict.
+///
+/// Also finds any name that is a file of one side and a folder of the other, and has both changed,
+/// beside a name that sorts between the two, such as "lib.txt" for "lib": libgit2 would not see the
+/// conflict.
 class RenamesToFolders
 {
   public:

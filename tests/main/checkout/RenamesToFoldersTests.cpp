@@ -131,4 +131,69 @@ TEST_F(RenamesToFolders, AreMergedIfTheyAreOursAndTheOtherSideLeftTheFolderAlone
     expectCleanAsGit();
 }
 
+/// A name that sorts between that of a file and what is in a folder of the same name. libgit2 would
+/// not see the conflict, and leave both out of the merge, or fail halfway.
+class FilesAgainstFolders : public RenamesToFolders, public testing::WithParamInterface<std::string>
+{
+  protected:
+    void expectBesideRefused(const std::string &name) const
+    {
+        expectMergeRefused(refusal(
+            "'" + name + "' is a file of one side and a folder of the other, beside '" + name +
+            GetParam().substr(0, GetParam().find('/')) + "': merge with 'git merge'"));
+    }
+    void addSibling(const std::string &name)
+    {
+        repository_.commitAll(writes(name + GetParam(), "x"), "a sibling");
+    }
+};
+
+TEST_P(FilesAgainstFolders, AreRefusedIfBothAreNew)
+{
+    addSibling("new");
+    diverge(writes("new", "ours\n"), writes("new/inside", "theirs\n"));
+    expectBesideRefused("new");
+}
+
+TEST_P(FilesAgainstFolders, AreRefusedInAFolder)
+{
+    addSibling("d/new");
+    diverge(writes("d/new/inside", "ours\n"), writes("d/new", "theirs\n"));
+    expectBesideRefused("d/new");
+}
+
+TEST_P(FilesAgainstFolders, AreRefusedIfTheSiblingIsNewToo)
+{
+    diverge(writes("new", "ours\n") + writes("new" + GetParam(), "x"),
+            writes("new/inside", "theirs\n"));
+    expectBesideRefused("new");
+}
+
+TEST_P(FilesAgainstFolders, AreRefusedIfTheyChangedTheFile)
+{
+    addSibling("file");
+    diverge(removes("file") + writes("file/inside", "ours\n"), writes("file", "theirs\n"));
+    expectBesideRefused("file");
+}
+
+TEST_P(FilesAgainstFolders, AreRefusedIfWeChangedTheFile)
+{
+    addSibling("file");
+    diverge(writes("file", "ours\n"), removes("file") + writes("file/inside", "theirs\n"));
+    expectBesideRefused("file");
+}
+
+TEST_P(FilesAgainstFolders, AreMergedIfOnlyOneSideHasChangedThem)
+{
+    addSibling("file");
+    addSibling("d");
+    diverge(writes("other", "ours\n"),
+            removes("file") + writes("file/inside", "x") + removes("d") + writes("d", "y"));
+    expectCleanAsGit();
+}
+
+INSTANTIATE_TEST_SUITE_P(Beside, FilesAgainstFolders,
+                         testing::Values("-1", ".txt", "-folder/inside"),
+                         [](const auto &sibling) { return std::to_string(sibling.index); });
+
 } // namespace
