@@ -42,6 +42,11 @@ Finding findOverlookedEdit(WorkingCopy &copy, const TreeChange &change)
     {
         return {};
     }
+    if (S_ISDIR(status.st_mode) && copy.holdsFiles(change.path) &&
+        copy.isIgnoredByLibGit2(change.path))
+    {
+        return inTheWay(change.path, Standing::Folder);
+    }
     if (S_ISREG(status.st_mode) && !copy.isReadable(change.path))
     {
         return Obstacle{change.path, "'" + change.path +

@@ -13,6 +13,8 @@ namespace vclink::git
 /// Finds a tracked file with a change that libgit2 does not see: it compares only the size and the
 /// time of the last change, and takes a file that it cannot read for an unchanged one. git also
 /// compares the inode and the time at which that changed.
+/// Also finds a folder in the place of a tracked file, if the name is ignored: libgit2 would delete
+/// the folder.
 Finding findOverlookedEdit(WorkingCopy &copy, const TreeChange &change);
 
 /// Finds a file that is in the index although it is ignored, in the place of a new file or folder.

@@ -137,6 +137,16 @@ TEST_F(OverlookedEdits, OfStagedFilesThatAreIgnoredAreKept)
     EXPECT_EQ(repository_.read("logs/mine"), "mine\n");
 }
 
+TEST_F(OverlookedEdits, AreFoldersInThePlaceOfATrackedFileThatIsIgnored)
+{
+    ignore("d/");
+    makeBranch("topic", writes("d/f", "theirs\n") + runsGit({"add", "--force", "d/f"}));
+    repository_.remove("d/f");
+    repository_.write("d/f/mine", "mine\n");
+    expectRefused(inTheWay("folder 'd/f'"));
+    EXPECT_EQ(repository_.read("d/f/mine"), "mine\n");
+}
+
 TEST_F(OverlookedEdits, AreNotStagedFilesThatTheBranchHasAsWell)
 {
     ignore("*.log");
