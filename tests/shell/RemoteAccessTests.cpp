@@ -1,9 +1,12 @@
 // SPDX-License-Identifier: MIT
-#include <memory>
+#include <filesystem>
+#include <string>
+#include <vector>
 
 #include <gmock/gmock.h>
 
 #include "ShellFixture.hpp"
+#include "transport/ServerOfTheSuite.hpp"
 #include "transport/SshAgent.hpp"
 #include "transport/SshServer.hpp"
 #include "transport/WebServer.hpp"
@@ -20,22 +23,10 @@ using testing::StartsWith;
 
 const std::string leakOptions = "print_suppressions=0:suppressions=" VCLINK_SSH_LEAK_SUPPRESSIONS;
 
-/// The servers run before a test's environment is made, since they outlive it.
-template <class Server> class AccessTest : public ShellFixture
+template <class Server> class AccessTest : public ServerOfTheSuite<Server>, public ShellFixture
 {
   protected:
-    static void TearDownTestSuite()
-    {
-        running().reset();
-    }
-    template <class... Arguments> static void start(const Arguments &...arguments)
-    {
-        running() = std::make_unique<Server>(arguments...);
-    }
-    static Server &server()
-    {
-        return *running();
-    }
+    using ServerOfTheSuite<Server>::TearDownTestSuite;
 
     /// Clones what the server has at an address; nobody is there to be asked.
     CommandResult clone(const std::string &address, const std::string &agent = "") const
@@ -59,23 +50,11 @@ template <class Server> class AccessTest : public ShellFixture
         EXPECT_THAT(lines.at(0), StartsWith("vclink-shell: Git could not complete the operation"));
         return result.errors.substr(lines.at(0).size() + 1);
     }
-
-  private:
-    static std::unique_ptr<Server> &running()
-    {
-        static std::unique_ptr<Server> server;
-        return server;
-    }
 };
 
 class ShellSshAccess : public AccessTest<SshServer>
 {
   protected:
-    static void SetUpTestSuite()
-    {
-        start();
-    }
-
     std::string url_ = server().url(server().makeRepository());
 };
 
@@ -155,14 +134,14 @@ TEST_F(ShellSshAccess, IsExplainedForWhatIsConfiguredToo)
     }
 }
 
-class ShellPasswordAccess : public AccessTest<WebServer>
+struct PasswordServer : WebServer
 {
-  protected:
-    static void SetUpTestSuite()
+    PasswordServer() : WebServer(Site::HttpWithPassword)
     {
-        start(WebServer::Site::HttpWithPassword);
     }
 };
+
+using ShellPasswordAccess = AccessTest<PasswordServer>;
 
 TEST_F(ShellPasswordAccess, IsRefusedWithoutAQuestion)
 {
