@@ -85,9 +85,9 @@ class VCLINK_GIT_EXPORT BranchManager
     virtual void createBranch(const BranchParameters &parameters) = 0;
 
     /// Deletes a local branch, merged or not: commits that only it had can be lost. Fails for the
-    /// current branch, and for one to which a rebase or bisection returns. Also removes its settings
-    /// from the repository's own configuration file: if that fails at the end, the branch is gone.
-    /// git_branch_delete, git_config_delete_entry, git_config_delete_multivar.
+    /// current branch, and for one to which a rebase or bisection returns. Also removes its
+    /// settings from the repository's own configuration file: if that fails at the end, the branch
+    /// is gone. git_branch_delete, git_config_delete_entry, git_config_delete_multivar.
     virtual void deleteBranch(const BranchName &name) = 0;
 
     /// Returns the short name of the current branch, which HEAD points to. Fails if the repository
