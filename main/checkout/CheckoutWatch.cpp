@@ -8,7 +8,7 @@
 #include <git2.h>
 
 #include "error/errorUtil/GitResult.hpp"
-#include "main/checkout/RenamesToFolders.hpp"
+#include "main/checkout/FilesAgainstFolders.hpp"
 #include "main/checkout/askRules.hpp"
 #include "main/checkout/conflictLocks.hpp"
 #include "main/checkout/gitlinks.hpp"
@@ -147,13 +147,13 @@ void CheckoutWatch::lookBeforeMerge(const git_oid *theirs)
     {
         Finding found;
         RenamedLocks renamed;
-        RenamesToFolders toFolders;
+        FilesAgainstFolders againstFolders;
         visitTreeChanges(repository_, before.get(), after.get(),
                          [&](const TreeChange &change)
                          {
                              found = judgeMerge(copy, change, after.get());
                              renamed.note(copy, change);
-                             toFolders.note(copy, change, after.get());
+                             againstFolders.note(copy, change, after.get());
                              if (!staysFile(change))
                              {
                                  merged_.noteChange(copy, change);
@@ -168,7 +168,7 @@ void CheckoutWatch::lookBeforeMerge(const git_oid *theirs)
         }
         if (!found)
         {
-            found = toFolders.find(repository_, copy, before.get(), after.get());
+            found = againstFolders.find(repository_, copy, before.get(), after.get());
         }
         first = firstOf(first, found);
     }

@@ -187,72 +187,87 @@ void RenamedLocks::noteMoves(std::vector<Moves> &moves, const std::vector<Candid
     }
 }
 
+git_index_entry RenamedLocks::entryFor(const File &file)
+{
+    git_index_entry entry{};
+    entry.path = file.path.c_str();
+    entry.mode = file.mode;
+    entry.id = file.id;
+    return entry;
+}
+
+bool RenamedLocks::isInConflict(git_repository *repository, const TreeChange &change,
+                                const std::vector<Candidate> &candidates)
+{
+    const git_index_entry renamed = entryOf(change.path, change.after);
+    return std::any_of(candidates.begin(), candidates.end(),
+                       [&](const Candidate &candidate)
+                       {
+                           const git_index_entry base = entryFor(candidate.before);
+                           const git_index_entry changed = entryFor(candidate.changed);
+                           return isConflict(repository, &base, renamed, changed);
+                       });
+}
+
+Finding RenamedLocks::findEmptied(const TreeChange &change,
+                                  const std::vector<Candidate> &candidates)
+{
+    if (!isEmptyBlob(*git_tree_entry_id(change.after)))
+    {
+        return {};
+    }
+    const auto emptied =
+        std::find_if(candidates.begin(), candidates.end(),
+                     [](const Candidate &candidate) { return isEmptyBlob(candidate.before.id); });
+    return emptied == candidates.end() ? Finding()
+                                       : takenForRenamed(emptied->before.path, change.path);
+}
+
+Finding RenamedLocks::findUnclear(const std::vector<Moves> &moves,
+                                  const std::vector<Candidate> &candidates)
+{
+    const auto unclear =
+        std::find_if(moves.begin(), moves.end(),
+                     [](const Moves &each) { return each.deleted > 1 && each.isAdded; });
+    if (unclear == moves.end())
+    {
+        return {};
+    }
+    const auto candidate = candidates.begin() + (unclear - moves.begin());
+    return amongSameContents(candidate->before.path);
+}
+
 Finding RenamedLocks::findIn(git_repository *repository, WorkingCopy &copy, const git_tree *before,
                              const git_tree *renaming, const git_tree *theirs,
                              const std::vector<Candidate> &candidates)
 {
-    Finding found;
     if (candidates.empty())
     {
-        return found;
+        return {};
     }
-    const auto entryFor = [](const File &file)
-    {
-        git_index_entry entry{};
-        entry.path = file.path.c_str();
-        entry.mode = file.mode;
-        entry.id = file.id;
-        return entry;
-    };
-    const auto isInConflict = [&](const TreeChange &change)
-    {
-        const git_index_entry renamed = entryOf(change.path, change.after);
-        return std::any_of(candidates.begin(), candidates.end(),
-                           [&](const Candidate &candidate)
-                           {
-                               const git_index_entry base = entryFor(candidate.before);
-                               const git_index_entry changed = entryFor(candidate.changed);
-                               return isConflict(repository, &base, renamed, changed);
-                           });
-    };
-    const auto obstacleOf = [&](const std::string &path)
-    {
-        return isThere(copy, path + ".lock", theirs) ? besideLock(path)
-                                                     : findUnwritableFolderOf(copy, path);
-    };
-    const auto emptied =
-        std::find_if(candidates.begin(), candidates.end(),
-                     [](const Candidate &candidate) { return isEmptyBlob(candidate.before.id); });
+    Finding found;
     std::vector<Moves> moves(candidates.size());
-    visitTreeChanges(repository, before, renaming,
-                     [&](const TreeChange &change)
-                     {
-                         noteMoves(moves, candidates, change);
-                         const bool isAdded = change.before == nullptr && change.after != nullptr &&
-                                              !isGitlink(change.after);
-                         if (isAdded && emptied != candidates.end() &&
-                             isEmptyBlob(*git_tree_entry_id(change.after)))
-                         {
-                             found = takenForRenamed(emptied->before.path, change.path);
-                             return false;
-                         }
-                         Finding obstacle = isAdded ? obstacleOf(change.path) : Finding();
-                         if (obstacle &&
-                             (hasCommand(repository, change.path) || isInConflict(change)))
-                         {
-                             found = std::move(obstacle);
-                         }
-                         return !found;
-                     });
-    const auto unclear =
-        std::find_if(moves.begin(), moves.end(),
-                     [](const Moves &each) { return each.deleted > 1 && each.isAdded; });
-    if (!found && unclear != moves.end())
+    const auto look = [&](const TreeChange &change)
     {
-        found = amongSameContents(
-            candidates[static_cast<std::size_t>(unclear - moves.begin())].before.path);
-    }
-    return found;
+        noteMoves(moves, candidates, change);
+        if (change.before != nullptr || change.after == nullptr || isGitlink(change.after))
+        {
+            return true;
+        }
+        found = findEmptied(change, candidates);
+        if (!found)
+        {
+            const Finding obstacle = isThere(copy, change.path + ".lock", theirs)
+                                         ? besideLock(change.path)
+                                         : findUnwritableFolderOf(copy, change.path);
+            const bool isWritten = obstacle && (hasCommand(repository, change.path) ||
+                                                isInConflict(repository, change, candidates));
+            found = isWritten ? obstacle : Finding();
+        }
+        return !found;
+    };
+    visitTreeChanges(repository, before, renaming, look);
+    return found ? found : findUnclear(moves, candidates);
 }
 
 } // namespace vclink::git

@@ -5,6 +5,7 @@
 #include <string>
 #include <vector>
 
+#include <git2/index.h>
 #include <git2/oid.h>
 #include <git2/tree.h>
 #include <git2/types.h>
@@ -66,6 +67,12 @@ class RenamedLocks
     };
     static void noteMoves(std::vector<Moves> &moves, const std::vector<Candidate> &candidates,
                           const TreeChange &change);
+    static git_index_entry entryFor(const File &file);
+    static bool isInConflict(git_repository *repository, const TreeChange &change,
+                             const std::vector<Candidate> &candidates);
+    static Finding findEmptied(const TreeChange &change, const std::vector<Candidate> &candidates);
+    static Finding findUnclear(const std::vector<Moves> &moves,
+                               const std::vector<Candidate> &candidates);
     static Finding findIn(git_repository *repository, WorkingCopy &copy, const git_tree *before,
                           const git_tree *renaming, const git_tree *theirs,
                           const std::vector<Candidate> &candidates);

@@ -1,9 +1,8 @@
 // SPDX-License-Identifier: MIT
-#include "main/checkout/RenamesToFolders.hpp"
+#include "main/checkout/FilesAgainstFolders.hpp"
 
 #include <algorithm>
 #include <cstddef>
-#include <initializer_list>
 #include <iterator>
 #include <limits>
 #include <memory>
@@ -14,6 +13,7 @@
 
 #include "error/errorUtil/GitResult.hpp"
 #include "main/checkout/gitlinks.hpp"
+#include "main/checkout/siblingNames.hpp"
 #include "util/repository/repository.hpp"
 
 namespace vclink::git
@@ -22,6 +22,20 @@ namespace
 {
 
 using Diff = std::unique_ptr<git_diff, void (*)(git_diff *)>;
+using Paths = std::set<std::string>;
+
+template <class Condition> Paths those(const Paths &paths, Condition condition)
+{
+    Paths result;
+    std::copy_if(paths.begin(), paths.end(), std::inserter(result, result.end()), condition);
+    return result;
+}
+
+Paths joined(Paths left, Paths right)
+{
+    left.merge(right);
+    return left;
+}
 
 Diff compare(git_repository *repository, git_tree *before, git_tree *after)
 {
@@ -45,13 +59,6 @@ void findRenames(git_diff *diff)
     check(git_diff_find_similar, diff, &options);
 }
 
-/// libgit2 sees such a conflict only if the names are next to each other.
-Obstacle besideSibling(const std::string &path, const std::string &sibling)
-{
-    return {path, "'" + path + "' is a file of one side and a folder of the other, beside '" +
-                      sibling + "': merge with 'git merge'"};
-}
-
 /// Returns true if both trees have this file or folder, with the same content.
 bool isSame(const git_tree *left, const git_tree *right, const std::string &path)
 {
@@ -61,55 +68,7 @@ bool isSame(const git_tree *left, const git_tree *right, const std::string &path
            isSameId(*git_tree_entry_id(leftEntry.get()), *git_tree_entry_id(rightEntry.get()));
 }
 
-/// Returns a name of the same folder that sorts between the path and what is below it, as "lib-1"
-/// and "lib.txt" do for "lib". Empty if there is none.
-std::string siblingIn(git_repository *repository, const git_tree *tree, const std::string &path)
-{
-    const std::size_t start = path.rfind('/') + 1;
-    OwnedHandle<git_tree> parent;
-    if (start > 0)
-    {
-        const OwnedTreeEntry entry = findInTree(tree, path.substr(0, start - 1));
-        if (entry == nullptr || git_tree_entry_type(entry.get()) != GIT_OBJECT_TREE)
-        {
-            return {};
-        }
-        parent = lookupTree(repository, git_tree_entry_id(entry.get()));
-        tree = parent.get();
-    }
-    const std::string name = path.substr(start);
-    const std::size_t count = tree != nullptr ? git_tree_entrycount(tree) : 0;
-    for (std::size_t i = 0; i < count; ++i)
-    {
-        const std::string sibling = git_tree_entry_name(git_tree_entry_byindex(tree, i));
-        const bool isLonger =
-            sibling.size() > name.size() && sibling.compare(0, name.size(), name) == 0;
-        if (isLonger && static_cast<unsigned char>(sibling[name.size()]) < '/')
-        {
-            return path.substr(0, start) + sibling;
-        }
-    }
-    return {};
-}
-
-Finding findSibling(git_repository *repository, std::initializer_list<const git_tree *> trees,
-                    const std::set<std::string> &paths)
-{
-    for (const std::string &path : paths)
-    {
-        for (const git_tree *const tree : trees)
-        {
-            const std::string sibling = siblingIn(repository, tree, path);
-            if (!sibling.empty())
-            {
-                return besideSibling(path, sibling);
-            }
-        }
-    }
-    return {};
-}
-
-bool isBelow(const std::set<std::string> &folders, const std::string &path)
+bool isBelow(const Paths &folders, const std::string &path)
 {
     for (auto end = path.find('/'); end != std::string::npos; end = path.find('/', end + 1))
     {
@@ -122,7 +81,7 @@ bool isBelow(const std::set<std::string> &folders, const std::string &path)
 }
 
 Finding findRenameTo(git_repository *repository, git_tree *before, git_tree *after,
-                     const std::set<std::string> &files, const std::set<std::string> &folders)
+                     const Paths &files, const Paths &folders)
 {
     if (files.empty() && folders.empty())
     {
@@ -157,7 +116,7 @@ Finding findRenameTo(git_repository *repository, git_tree *before, git_tree *aft
 
 } // namespace
 
-void RenamesToFolders::note(WorkingCopy &copy, const TreeChange &change, const git_tree *theirs)
+void FilesAgainstFolders::note(WorkingCopy &copy, const TreeChange &change, const git_tree *theirs)
 {
     noteFolder(copy, change, theirs);
     if (change.after == nullptr || copy.entryOf(change.path) != nullptr)
@@ -171,8 +130,8 @@ void RenamesToFolders::note(WorkingCopy &copy, const TreeChange &change, const g
     noteFileAbove(copy, change.path);
 }
 
-void RenamesToFolders::noteFolder(WorkingCopy &copy, const TreeChange &change,
-                                  const git_tree *theirs)
+void FilesAgainstFolders::noteFolder(WorkingCopy &copy, const TreeChange &change,
+                                     const git_tree *theirs)
 {
     if (change.before == nullptr || isGitlink(change.before))
     {
@@ -193,7 +152,7 @@ void RenamesToFolders::noteFolder(WorkingCopy &copy, const TreeChange &change,
     }
 }
 
-void RenamesToFolders::noteFileAbove(WorkingCopy &copy, const std::string &path)
+void FilesAgainstFolders::noteFileAbove(WorkingCopy &copy, const std::string &path)
 {
     const std::size_t size = path.rfind('/') + 1;
     if (path.compare(0, size, folder_) == 0)
@@ -212,30 +171,17 @@ void RenamesToFolders::noteFileAbove(WorkingCopy &copy, const std::string &path)
     }
 }
 
-Finding RenamesToFolders::find(git_repository *repository, const WorkingCopy &copy,
-                               git_tree *before, git_tree *theirs) const
+Finding FilesAgainstFolders::find(git_repository *repository, const WorkingCopy &copy,
+                                  git_tree *before, git_tree *theirs) const
 {
-    std::set<std::string> files;
-    for (const std::string &file : filesOfTheirs_)
-    {
-        if (!isSame(before, copy.head(), file))
-        {
-            files.insert(file);
-        }
-    }
-    std::set<std::string> foldersOfOurs = foldersOfOurs_;
-    std::copy_if(files.begin(), files.end(), std::inserter(foldersOfOurs, foldersOfOurs.end()),
-                 [=](const std::string &file) { return isFolderIn(before, file); });
-    std::set<std::string> foldersOfTheirs = foldersOfTheirs_;
-    std::copy_if(filesOfOurs_.begin(), filesOfOurs_.end(),
-                 std::inserter(foldersOfTheirs, foldersOfTheirs.end()),
-                 [=](const std::string &file) { return isFolderIn(before, file); });
-    std::set<std::string> conflicts = foldersOfOurs;
-    conflicts.insert(files.begin(), files.end());
-    conflicts.insert(foldersOfTheirs.begin(), foldersOfTheirs.end());
-    std::copy_if(filesOfOurs_.begin(), filesOfOurs_.end(),
-                 std::inserter(conflicts, conflicts.end()),
-                 [&](const std::string &file) { return !isSame(before, copy.head(), file); });
+    const auto isChanged = [&](const std::string &path)
+    { return !isSame(before, copy.head(), path); };
+    const auto wasFolder = [=](const std::string &path) { return isFolderIn(before, path); };
+    const Paths files = those(filesOfTheirs_, isChanged);
+    const Paths foldersOfOurs = joined(foldersOfOurs_, those(files, wasFolder));
+    const Paths foldersOfTheirs = joined(foldersOfTheirs_, those(filesOfOurs_, wasFolder));
+    const Paths conflicts = joined(joined(foldersOfOurs, files),
+                                   joined(foldersOfTheirs, those(filesOfOurs_, isChanged)));
     Finding found = findSibling(repository, {before, copy.head(), theirs}, conflicts);
     if (!found)
     {

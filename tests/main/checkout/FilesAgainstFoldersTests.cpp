@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-#include "main/checkout/RenamesToFolders.hpp"
+#include "main/checkout/FilesAgainstFolders.hpp"
 
 #include <string>
 
@@ -133,7 +133,7 @@ TEST_F(RenamesToFolders, AreMergedIfTheyAreOursAndTheOtherSideLeftTheFolderAlone
 
 /// A name that sorts between that of a file and what is in a folder of the same name. libgit2 would
 /// not see the conflict, and leave both out of the merge, or fail halfway.
-class FilesAgainstFolders : public RenamesToFolders, public testing::WithParamInterface<std::string>
+class FilesBesideSiblings : public RenamesToFolders, public testing::WithParamInterface<std::string>
 {
   protected:
     void expectBesideRefused(const std::string &name) const
@@ -148,42 +148,42 @@ class FilesAgainstFolders : public RenamesToFolders, public testing::WithParamIn
     }
 };
 
-TEST_P(FilesAgainstFolders, AreRefusedIfBothAreNew)
+TEST_P(FilesBesideSiblings, AreRefusedIfBothAreNew)
 {
     addSibling("new");
     diverge(writes("new", "ours\n"), writes("new/inside", "theirs\n"));
     expectBesideRefused("new");
 }
 
-TEST_P(FilesAgainstFolders, AreRefusedInAFolder)
+TEST_P(FilesBesideSiblings, AreRefusedInAFolder)
 {
     addSibling("d/new");
     diverge(writes("d/new/inside", "ours\n"), writes("d/new", "theirs\n"));
     expectBesideRefused("d/new");
 }
 
-TEST_P(FilesAgainstFolders, AreRefusedIfTheSiblingIsNewToo)
+TEST_P(FilesBesideSiblings, AreRefusedIfTheSiblingIsNewToo)
 {
     diverge(writes("new", "ours\n") + writes("new" + GetParam(), "x"),
             writes("new/inside", "theirs\n"));
     expectBesideRefused("new");
 }
 
-TEST_P(FilesAgainstFolders, AreRefusedIfTheyChangedTheFile)
+TEST_P(FilesBesideSiblings, AreRefusedIfTheyChangedTheFile)
 {
     addSibling("file");
     diverge(removes("file") + writes("file/inside", "ours\n"), writes("file", "theirs\n"));
     expectBesideRefused("file");
 }
 
-TEST_P(FilesAgainstFolders, AreRefusedIfWeChangedTheFile)
+TEST_P(FilesBesideSiblings, AreRefusedIfWeChangedTheFile)
 {
     addSibling("file");
     diverge(writes("file", "ours\n"), removes("file") + writes("file/inside", "theirs\n"));
     expectBesideRefused("file");
 }
 
-TEST_P(FilesAgainstFolders, AreMergedIfOnlyOneSideHasChangedThem)
+TEST_P(FilesBesideSiblings, AreMergedIfOnlyOneSideHasChangedThem)
 {
     addSibling("file");
     addSibling("d");
@@ -192,7 +192,7 @@ TEST_P(FilesAgainstFolders, AreMergedIfOnlyOneSideHasChangedThem)
     expectCleanAsGit();
 }
 
-INSTANTIATE_TEST_SUITE_P(Beside, FilesAgainstFolders,
+INSTANTIATE_TEST_SUITE_P(Beside, FilesBesideSiblings,
                          testing::Values("-1", ".txt", "-folder/inside"),
                          [](const auto &sibling) { return std::to_string(sibling.index); });
 

@@ -22,7 +22,7 @@ namespace vclink::git
 /// Also finds any name that is a file of one side and a folder of the other, and has both changed,
 /// beside a name that sorts between the two, such as "lib.txt" for "lib": libgit2 would not see the
 /// conflict.
-class RenamesToFolders
+class FilesAgainstFolders
 {
   public:
     /// Notes a name that is a file of one side and a folder of the other.
