@@ -20,7 +20,6 @@ using testing::ElementsAre;
 using testing::HasSubstr;
 using testing::Not;
 using vclink::test::readFile;
-using vclink::test::Scripts;
 
 using MergeDriverRun = vclink::test::MergeDriverFixture;
 

@@ -12,7 +12,6 @@
 
 #include "fl/filesystem/operations.hpp"
 #include "support/GitFixture.hpp"
-#include "support/Scripts.hpp"
 #include "support/interposition.hpp"
 #include "support/readFile.hpp"
 #include "support/text.hpp"
@@ -74,7 +73,6 @@ namespace git = vclink::git;
 using testing::IsEmpty;
 using vclink::test::asBytes;
 using vclink::test::readFile;
-using vclink::test::Scripts;
 
 class TemporaryFileHost : public vclink::test::GitFixture
 {

@@ -80,18 +80,18 @@ template <class Result, class... Arguments> struct Shim<Result(Arguments...)>
     static constexpr bool givesCode = std::is_same_v<Result, int>;
 
     /// The same function with another body for each of the functions of one type.
-    template <Real real, const char *const *name> static Result call(Arguments... arguments)
+    template <Real Body, const char *const *Name> static Result call(Arguments... arguments)
     {
-        const Passing passing(*name);
+        const Passing passing(*Name);
         if (!passing.isFollowed())
-            return real(arguments...);
-        const bool releases = std::is_void_v<Result> && isRelease(*name);
+            return Body(arguments...);
+        const bool releases = std::is_void_v<Result> && isRelease(*Name);
         passing.note(givesCode, releases, releases ? takenBack(arguments...) : nullptr);
         passing.tell<Hook>(arguments...);
         if constexpr (givesCode)
-            return callForCode(passing, real, arguments...);
+            return callForCode(passing, Body, arguments...);
         else
-            return answer(passing, real, arguments...);
+            return answer(passing, Body, arguments...);
     }
 
   private:
