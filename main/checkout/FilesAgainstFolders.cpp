@@ -68,6 +68,57 @@ bool isSame(const git_tree *left, const git_tree *right, const std::string &path
            isSameId(*git_tree_entry_id(leftEntry.get()), *git_tree_entry_id(rightEntry.get()));
 }
 
+/// Returns a folder of a tree, null if it has none of this name.
+OwnedHandle<git_tree> folderIn(git_repository *repository, const git_tree *tree,
+                               const std::string &path)
+{
+    const OwnedTreeEntry entry = findInTree(tree, path);
+    return entry != nullptr && git_tree_entry_type(entry.get()) == GIT_OBJECT_TREE
+               ? lookupTree(repository, git_tree_entry_id(entry.get()))
+               : nullptr;
+}
+
+/// Returns true if libgit2 does not see that a changed folder became a file on the other side: it
+/// compares the file only with the next name in its list, and that file must be new or changed.
+bool isOverlooked(git_repository *repository, const git_tree *before, const git_tree *side,
+                  const std::string &path)
+{
+    const OwnedHandle<git_tree> folderBefore = folderIn(repository, before, path);
+    const OwnedHandle<git_tree> folder = folderIn(repository, side, path);
+    std::string first;
+    visitTreeChanges(repository, nullptr, folderBefore.get(),
+                     [&first](const TreeChange &file)
+                     {
+                         first = file.path;
+                         return false;
+                     });
+    bool isNext = true;
+    bool isWritten = false;
+    visitTreeChanges(repository, folderBefore.get(), folder.get(),
+                     [&](const TreeChange &change)
+                     {
+                         isWritten = change.after != nullptr;
+                         isNext = isNext && isWritten && change.path <= first;
+                         return !isWritten;
+                     });
+    return isWritten && !isNext;
+}
+
+Finding findOverlooked(git_repository *repository, const git_tree *before, const git_tree *side,
+                       const Paths &folders)
+{
+    for (const std::string &path : folders)
+    {
+        if (isOverlooked(repository, before, side, path))
+        {
+            return Obstacle{path, "'" + path +
+                                      "' is a file of one side and a changed folder of the other: "
+                                      "merge with 'git merge'"};
+        }
+    }
+    return {};
+}
+
 bool isBelow(const Paths &folders, const std::string &path)
 {
     for (auto end = path.find('/'); end != std::string::npos; end = path.find('/', end + 1))
@@ -178,8 +229,10 @@ Finding FilesAgainstFolders::find(git_repository *repository, const WorkingCopy 
     { return !isSame(before, copy.head(), path); };
     const auto wasFolder = [=](const std::string &path) { return isFolderIn(before, path); };
     const Paths files = those(filesOfTheirs_, isChanged);
-    const Paths foldersOfOurs = joined(foldersOfOurs_, those(files, wasFolder));
-    const Paths foldersOfTheirs = joined(foldersOfTheirs_, those(filesOfOurs_, wasFolder));
+    const Paths keptByOurs = those(files, wasFolder);
+    const Paths keptByTheirs = those(filesOfOurs_, wasFolder);
+    const Paths foldersOfOurs = joined(foldersOfOurs_, keptByOurs);
+    const Paths foldersOfTheirs = joined(foldersOfTheirs_, keptByTheirs);
     const Paths conflicts = joined(joined(foldersOfOurs, files),
                                    joined(foldersOfTheirs, those(filesOfOurs_, isChanged)));
     Finding found = findSibling(repository, {before, copy.head(), theirs}, conflicts);
@@ -187,8 +240,15 @@ Finding FilesAgainstFolders::find(git_repository *repository, const WorkingCopy 
     {
         found = findRenameTo(repository, before, theirs, files, foldersOfTheirs);
     }
-    return found ? found
-                 : findRenameTo(repository, before, copy.head(), filesOfOurs_, foldersOfOurs);
+    if (!found)
+    {
+        found = findRenameTo(repository, before, copy.head(), filesOfOurs_, foldersOfOurs);
+    }
+    if (!found)
+    {
+        found = findOverlooked(repository, before, copy.head(), keptByOurs);
+    }
+    return found ? found : findOverlooked(repository, before, theirs, keptByTheirs);
 }
 
 } // namespace vclink::git

@@ -20,8 +20,8 @@ namespace vclink::git
 /// were a new one, libgit2 would have a conflict.
 ///
 /// Also finds any name that is a file of one side and a folder of the other, and has both changed,
-/// beside a name that sorts between the two, such as "lib.txt" for "lib": libgit2 would not see the
-/// conflict.
+/// beside a name that sorts between the two, such as "lib.txt" for "lib", or if the first file of
+/// the folder is not what changed: libgit2 would not see the conflict.
 class FilesAgainstFolders
 {
   public:

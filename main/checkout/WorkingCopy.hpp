@@ -112,6 +112,9 @@ class WorkingCopy
     [[nodiscard]] bool isIgnoredByLibGit2(const std::string &name) const;
     /// Returns true if libgit2 ignores the name, and Git may not.
     bool isFalselyIgnored(const std::string &name) const;
+    /// Returns true if only git can tell what it would store: the file has a filter of its own, or
+    /// another encoding in the working tree. See isEdited.
+    [[nodiscard]] bool isConvertedByGit(const std::string &name) const;
     /// Returns true if the content of the file, link or folder differs from its entry in the index.
     /// A missing file does not differ.
     bool isEdited(const git_index_entry &entry);

@@ -2,6 +2,8 @@
 // WorkingCopy: what is in single files, and whether they are ignored.
 #include "main/checkout/WorkingCopy.hpp"
 
+#include <cstring>
+
 #include <fcntl.h>
 #include <git2/ignore.h>
 #include <git2/odb.h>
@@ -11,6 +13,7 @@
 
 #include "error/errorUtil/GitResult.hpp"
 #include "main/checkout/negatedPatterns.hpp"
+#include "util/repository/attributes.hpp"
 #include "util/repository/objectIds.hpp"
 
 namespace vclink::git
@@ -36,6 +39,16 @@ bool WorkingCopy::isIgnoredByLibGit2(const std::string &name) const
     int ignored = 0;
     check(git_ignore_path_is_ignored, &ignored, repository_, name.c_str());
     return ignored != 0;
+}
+
+bool WorkingCopy::isConvertedByGit(const std::string &name) const
+{
+    const auto has = [&](const char *attribute)
+    {
+        const char *const value = readAttribute(repository_, name, attribute);
+        return git_attr_value(value) == GIT_ATTR_VALUE_STRING && std::strcmp(value, "ident") != 0;
+    };
+    return has("filter") || has("working-tree-encoding");
 }
 
 bool WorkingCopy::isEdited(const git_index_entry &entry)

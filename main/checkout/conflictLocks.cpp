@@ -3,11 +3,11 @@
 
 #include <algorithm>
 #include <cstddef>
+#include <iterator>
 #include <memory>
 #include <string>
 #include <utility>
 
-#include <git2/attr.h>
 #include <git2/errors.h>
 #include <git2/index.h>
 #include <git2/merge.h>
@@ -16,6 +16,7 @@
 #include "error/errorUtil/GitResult.hpp"
 #include "main/checkout/gitlinks.hpp"
 #include "main/checkout/obstaclesAhead.hpp"
+#include "util/repository/attributes.hpp"
 #include "util/repository/objectIds.hpp"
 
 namespace vclink::git
@@ -56,9 +57,7 @@ git_index_entry entryOf(const std::string &path, const git_tree_entry *side)
 /// The result of a command cannot be known in advance.
 bool hasCommand(git_repository *repository, const std::string &path)
 {
-    const char *value = nullptr;
-    static_cast<void>(git_attr_get(&value, repository, 0, path.c_str(), "merge"));
-    return git_attr_value(value) == GIT_ATTR_VALUE_STRING;
+    return git_attr_value(readAttribute(repository, path, "merge")) == GIT_ATTR_VALUE_STRING;
 }
 
 /// Returns true if the lines conflict.
@@ -96,13 +95,23 @@ Obstacle takenForRenamed(const std::string &path, const std::string &other)
                       "', which is empty too: merge with 'git merge'"};
 }
 
-/// libgit2 takes the first of them for the renamed one, git the one that keeps its last name.
+/// The bytes of an id, as a key.
+std::string rawId(const git_oid &id)
+{
+    return {std::begin(id.id), std::end(id.id)};
+}
+
+bool hasSameLastName(const std::string &left, const std::string &right)
+{
+    return left.substr(left.rfind('/') + 1) == right.substr(right.rfind('/') + 1);
+}
+
+/// libgit2 pairs them in the order of their paths, git prefers those that keep their last name.
 Obstacle amongSameContents(const std::string &path)
 {
-    return {path,
-            "one side has changed '" + path + "' and the other has deleted or renamed it and " +
-                "another file with the same content, and the change would go to any file of " +
-                "this content: merge with 'git merge'"};
+    return {path, "one side has changed '" + path + "', the other has renamed it or a file with " +
+                      "the same content, and the change could go to the wrong one: merge with " +
+                      "'git merge'"};
 }
 
 Obstacle besideLock(const std::string &path)
@@ -168,22 +177,29 @@ Finding RenamedLocks::find(git_repository *repository, WorkingCopy &copy, const 
     return found ? found : findIn(repository, copy, before, theirs, theirs, deletedByTheirs_);
 }
 
-void RenamedLocks::noteMoves(std::vector<Moves> &moves, const std::vector<Candidate> &candidates,
-                             const TreeChange &change)
+RenamedLocks::Contents RenamedLocks::contentsOf(const std::vector<Candidate> &candidates)
+{
+    Contents contents;
+    for (const Candidate &candidate : candidates)
+    {
+        contents[rawId(candidate.before.id)].changed = candidate.before.path;
+    }
+    return contents;
+}
+
+void RenamedLocks::noteMove(Contents &contents, const TreeChange &change)
 {
     if ((change.before == nullptr) == (change.after == nullptr))
     {
         return;
     }
     const bool isAdded = change.before == nullptr;
-    const git_oid &id = *git_tree_entry_id(isAdded ? change.after : change.before);
-    for (std::size_t i = 0; i < candidates.size(); ++i)
+    const auto found =
+        contents.find(rawId(*git_tree_entry_id(isAdded ? change.after : change.before)));
+    if (found != contents.end())
     {
-        if (isSameId(id, candidates[i].before.id))
-        {
-            moves[i].isAdded = moves[i].isAdded || isAdded;
-            moves[i].deleted += isAdded ? 0U : 1U;
-        }
+        Moves &moves = found->second;
+        (isAdded ? moves.added : moves.deleted).push_back(change.path);
     }
 }
 
@@ -223,18 +239,21 @@ Finding RenamedLocks::findEmptied(const TreeChange &change,
                                        : takenForRenamed(emptied->before.path, change.path);
 }
 
-Finding RenamedLocks::findUnclear(const std::vector<Moves> &moves,
-                                  const std::vector<Candidate> &candidates)
+Finding RenamedLocks::findUnclear(const Contents &contents)
 {
-    const auto unclear =
-        std::find_if(moves.begin(), moves.end(),
-                     [](const Moves &each) { return each.deleted > 1 && each.isAdded; });
-    if (unclear == moves.end())
+    for (const auto &[id, moves] : contents)
     {
-        return {};
+        const std::size_t pairs = std::min(moves.deleted.size(), moves.added.size());
+        const auto deletedEnd = moves.deleted.begin() + static_cast<std::ptrdiff_t>(pairs);
+        const bool isClear =
+            moves.deleted.size() + moves.added.size() <= 2 ||
+            std::equal(moves.deleted.begin(), deletedEnd, moves.added.begin(), hasSameLastName);
+        if (!isClear)
+        {
+            return amongSameContents(moves.changed);
+        }
     }
-    const auto candidate = candidates.begin() + (unclear - moves.begin());
-    return amongSameContents(candidate->before.path);
+    return {};
 }
 
 Finding RenamedLocks::findIn(git_repository *repository, WorkingCopy &copy, const git_tree *before,
@@ -246,10 +265,10 @@ Finding RenamedLocks::findIn(git_repository *repository, WorkingCopy &copy, cons
         return {};
     }
     Finding found;
-    std::vector<Moves> moves(candidates.size());
+    Contents contents = contentsOf(candidates);
     const auto look = [&](const TreeChange &change)
     {
-        noteMoves(moves, candidates, change);
+        noteMove(contents, change);
         if (change.before != nullptr || change.after == nullptr || isGitlink(change.after))
         {
             return true;
@@ -267,7 +286,7 @@ Finding RenamedLocks::findIn(git_repository *repository, WorkingCopy &copy, cons
         return !found;
     };
     visitTreeChanges(repository, before, renaming, look);
-    return found ? found : findUnclear(moves, candidates);
+    return found ? found : findUnclear(contents);
 }
 
 } // namespace vclink::git

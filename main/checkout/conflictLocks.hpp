@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
-#include <cstddef>
+#include <map>
 #include <string>
 #include <vector>
 
@@ -33,7 +33,7 @@ Finding findLockBesideFile(WorkingCopy &copy, const TreeChange &change, const gi
 /// The same rule for a file that one side has renamed and the other has changed. There it also
 /// finds folders that cannot be written to, because libgit2 removes the file and
 /// creates it again, and files that libgit2 may take for the renamed one by mistake: empty ones,
-/// and several with the same content.
+/// and several with the same content of which one changes its last name.
 class RenamedLocks
 {
   public:
@@ -59,20 +59,22 @@ class RenamedLocks
         File before;
         File changed;
     };
-    /// What one side has done with files of a candidate's content.
+    /// What one side has done with the files of a candidate's content, in path order.
     struct Moves
     {
-        std::size_t deleted = 0;
-        bool isAdded = false;
+        std::string changed;
+        std::vector<std::string> deleted;
+        std::vector<std::string> added;
     };
-    static void noteMoves(std::vector<Moves> &moves, const std::vector<Candidate> &candidates,
-                          const TreeChange &change);
+    using Contents = std::map<std::string, Moves>;
+
+    static Contents contentsOf(const std::vector<Candidate> &candidates);
+    static void noteMove(Contents &contents, const TreeChange &change);
     static git_index_entry entryFor(const File &file);
     static bool isInConflict(git_repository *repository, const TreeChange &change,
                              const std::vector<Candidate> &candidates);
     static Finding findEmptied(const TreeChange &change, const std::vector<Candidate> &candidates);
-    static Finding findUnclear(const std::vector<Moves> &moves,
-                               const std::vector<Candidate> &candidates);
+    static Finding findUnclear(const Contents &contents);
     static Finding findIn(git_repository *repository, WorkingCopy &copy, const git_tree *before,
                           const git_tree *renaming, const git_tree *theirs,
                           const std::vector<Candidate> &candidates);

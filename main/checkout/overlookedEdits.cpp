@@ -53,7 +53,9 @@ Finding findOverlookedEdit(WorkingCopy &copy, const TreeChange &change)
                                          "' cannot be read, and its changes would be lost in the "
                                          "checkout"};
     }
-    if (isAsLibGit2Sees && copy.isEdited(*entry))
+    const bool isOfSameKind = (entry->mode & S_IFMT) == (status.st_mode & S_IFMT);
+    if (isAsLibGit2Sees && isOfSameKind && !copy.isConvertedByGit(change.path) &&
+        copy.isEdited(*entry))
     {
         return Obstacle{change.path, "the uncommitted changes of '" + change.path +
                                          "' would be lost in the checkout"};

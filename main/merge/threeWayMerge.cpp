@@ -28,6 +28,7 @@
 #include "util/lock/IndexLock.hpp"
 #include "util/path/PathspecArray.hpp"
 #include "util/path/pathspecEscape.hpp"
+#include "util/repository/attributes.hpp"
 #include "util/repository/repository.hpp"
 #include "util/scope/ScopedCleanup.hpp"
 #include "vclink/git/messageIdentifiers.hpp"
@@ -37,19 +38,10 @@ namespace vclink::git
 namespace
 {
 
-/// Returns an attribute of a file, from the attribute files of the working tree, then of the index.
-/// A failure counts as no attribute.
-git_attr_value_t readAttribute(git_repository *repository, const char *path, const char *name)
-{
-    const char *value = nullptr;
-    static_cast<void>(git_attr_get(&value, repository, 0, path, name));
-    return git_attr_value(value);
-}
-
 bool isUnmergeable(git_repository *repository, const char *path)
 {
-    const git_attr_value_t merge = readAttribute(repository, path, "merge");
-    const git_attr_value_t text = readAttribute(repository, path, "text");
+    const git_attr_value_t merge = git_attr_value(readAttribute(repository, path, "merge"));
+    const git_attr_value_t text = git_attr_value(readAttribute(repository, path, "text"));
     return merge == GIT_ATTR_VALUE_FALSE ||
            (text == GIT_ATTR_VALUE_FALSE && merge == GIT_ATTR_VALUE_STRING);
 }

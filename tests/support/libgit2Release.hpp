@@ -23,6 +23,9 @@ constexpr bool isSince(int major, int minor)
 /// configuration.
 constexpr bool losesMemory = !isSince(1, 6);
 
+/// A lock of a configuration file that is not committed also closes the file.
+constexpr bool closesLockedFile = !isSince(1, 8);
+
 /// Looking up a value in a file that was broken after it was opened ends the process.
 constexpr bool endsAtBrokenFiles = isSince(1, 8);
 

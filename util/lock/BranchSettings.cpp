@@ -9,10 +9,12 @@
 #include <utility>
 
 #include <git2/config.h>
+#include <git2/deprecated.h> // LIBGIT2_VER_MAJOR, of which 1.8 has made another name
 #include <git2/errors.h>
 #include <git2/repository.h>
 #include <git2/sys/repository.h>
 #include <git2/transaction.h>
+#include <git2/version.h>
 
 #include "error/errorUtil/GitResult.hpp"
 #include "error/errorUtil/callbackException.hpp"
@@ -23,6 +25,9 @@ namespace vclink::git
 {
 namespace
 {
+
+/// A lock that is not committed closes the configuration as well, before libgit2 1.8.
+constexpr bool closesLockedFile = LIBGIT2_VER_MAJOR == 1 && LIBGIT2_VER_MINOR < 8;
 
 std::string pathOfConfiguration(git_repository *repository)
 {
@@ -125,7 +130,7 @@ BranchSettings::BranchSettings(git_repository *repository, const std::string &br
     : mode_(pathOfConfiguration(repository)),
       file_(acquire<git_config>(git_config_open_ondisk, pathOfConfiguration(repository).c_str())
                 .value()),
-      lock_(nullptr, git_transaction_free)
+      lock_(nullptr, Unlock{&file_})
 {
     const Settings settings = findSettings(file_.get(), branch);
     if (settings.empty())
@@ -145,10 +150,20 @@ BranchSettings::BranchSettings(git_repository *repository, const std::string &br
 
 BranchSettings::~BranchSettings() = default;
 
+void BranchSettings::Unlock::operator()(git_transaction *lock) const noexcept
+{
+    if (closesLockedFile && file != nullptr)
+    {
+        static_cast<void>(file->release());
+    }
+    git_transaction_free(lock);
+}
+
 void BranchSettings::remove()
 {
     if (lock_ != nullptr)
     {
+        lock_.get_deleter().file = nullptr;
         check(git_transaction_commit, lock_.get());
     }
 }

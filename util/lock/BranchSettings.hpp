@@ -36,10 +36,18 @@ class BranchSettings
     void remove();
 
   private:
+    /// Ends a lock. Nothing is written unless it was committed.
+    struct Unlock
+    {
+        /// The locked file, until the lock is committed.
+        OwnedHandle<git_config> *file;
+        void operator()(git_transaction *lock) const noexcept;
+    };
+
     KeptMode mode_;
     OwnedHandle<git_config> file_;
     /// Null if there are none.
-    std::unique_ptr<git_transaction, void (*)(git_transaction *)> lock_;
+    std::unique_ptr<git_transaction, Unlock> lock_;
 };
 
 /// Lets a repository have no configuration in a scope.

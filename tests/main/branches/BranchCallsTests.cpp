@@ -85,10 +85,25 @@ TEST_F(CallsOnBranches, DeleteNoSettingsIfTheyFailToDeleteTheBranch)
 {
     repository_.git({"branch", "topic"});
     repository_.git({"config", "branch.topic.remote", "o"});
+    git_config *file = nullptr;
+    int closed = 0;
     LibGit2Recorder calls;
     calls.fail({{"git_branch_delete", GIT_ERROR}});
+    calls.answer<git_config_lock>(
+        [&](auto *lock, git_transaction **transaction, git_config *config)
+        {
+            file = config;
+            return lock(transaction, config);
+        });
+    calls.answer<git_config_free>(
+        [&](auto *free, git_config *config)
+        {
+            closed += config == file ? 1 : 0;
+            free(config);
+        });
     failureOf([this] { branches().deleteBranch("topic"); });
     EXPECT_EQ(repository_.line({"config", "branch.topic.remote"}), "o");
+    EXPECT_EQ(closed, libgit2_release::closesLockedFile ? 0 : 1);
 }
 
 TEST_F(CallsOnBranches, DeleteNoBranchThatIsMadeMeanwhile)

@@ -70,9 +70,8 @@ class EqualFilesInMerges : public ObstacleFixture
     {
         expectMergeRefused(
             refusal("one side has changed '" + name +
-                    "' and the other has deleted or renamed it and another file with the same "
-                    "content, and the change would go to any file of this content: merge with "
-                    "'git merge'"));
+                    "', the other has renamed it or a file with the same content, and the change "
+                    "could go to the wrong one: merge with 'git merge'"));
     }
 };
 
@@ -93,6 +92,22 @@ TEST_F(EqualFilesInMerges, AreMergedIfOnlyTheChangedOneIsRenamed)
 {
     diverge(writes("b/y", "1\n2\n3\n4\n"), makesFolder("c") + moves("b/y", "c/y"));
     expectCleanAsGit();
+}
+
+TEST_F(EqualFilesInMerges, AreRefusedIfTheChangedOneIsRenamedAndCopied)
+{
+    diverge(makesFolder("z") + moves("b/y", "z/y") + writes("a/copy", "1\n2\n3\n"),
+            writes("b/y", "1\n2\n3\n4\n"));
+    expectEqualRefused("b/y");
+}
+
+TEST_F(EqualFilesInMerges, AreMergedIfTheirFoldersAreMoved)
+{
+    diverge(makesFolder("lib") + moves("a", "lib/a") + moves("b", "lib/b"),
+            writes("b/y", "1\n2\n3\n4\n"));
+    expectCleanAsGit();
+    EXPECT_EQ(repository_.read("lib/b/y"), "1\n2\n3\n4\n");
+    EXPECT_EQ(repository_.read("lib/a/x"), "1\n2\n3\n");
 }
 
 } // namespace

@@ -131,6 +131,46 @@ TEST_F(RenamesToFolders, AreMergedIfTheyAreOursAndTheOtherSideLeftTheFolderAlone
     expectCleanAsGit();
 }
 
+/// A folder that one side replaced by a file, and of which the other side changed something.
+/// libgit2 sees that only if it is the first file of the folder.
+class ChangedFolders : public ObstacleFixture
+{
+  protected:
+    const Change replaces_ = removes("d") + writes("d", "a file\n");
+    const Failure refused_ = refusal("'d' is a file of one side and a changed folder of the other: "
+                                     "merge with 'git merge'");
+};
+
+TEST_F(ChangedFolders, AreRefusedIfWeReplacedThem)
+{
+    diverge(replaces_, writes("d/g", "theirs\n"));
+    expectMergeRefused(refused_);
+}
+
+TEST_F(ChangedFolders, AreRefusedIfTheyReplacedThem)
+{
+    diverge(writes("d/g", "ours\n"), replaces_);
+    expectMergeRefused(refused_);
+}
+
+TEST_F(ChangedFolders, AreRefusedIfTheirFirstFileIsDeletedToo)
+{
+    diverge(replaces_, removes("d/f") + writes("d/g", "theirs\n"));
+    expectMergeRefused(refused_);
+}
+
+TEST_F(ChangedFolders, AreMergedIfFilesWereOnlyDeleted)
+{
+    diverge(replaces_, removes("d/g"));
+    expectCleanAsGit();
+}
+
+TEST_F(ChangedFolders, AreInConflictIfTheirFirstFileIsChanged)
+{
+    diverge(replaces_, writes("d/f", "theirs\n"));
+    expectConflicts("topic");
+}
+
 /// A name that sorts between that of a file and what is in a folder of the same name. libgit2 would
 /// not see the conflict, and leave both out of the merge, or fail halfway.
 class FilesBesideSiblings : public RenamesToFolders, public testing::WithParamInterface<std::string>

@@ -100,6 +100,20 @@ TEST_F(OverlookedEdits, AreNotOtherInodesWithTheSameContent)
     EXPECT_THAT(status(), IsEmpty());
 }
 
+/// As after a copy of a working copy with its times. What git stores is not what the file holds.
+TEST_F(OverlookedEdits, AreNotOtherInodesOfFilteredFiles)
+{
+    repository_.git({"config", "filter.large.clean", "tr a-z A-Z"});
+    repository_.git({"config", "filter.large.smudge", "tr A-Z a-z"});
+    repository_.commitAll(writes(".gitattributes", "/d/f filter=large\n"), "attributes");
+    repository_.commitAll(writes("d/f", "large\n"), "filtered");
+    makeBranch("topic", writes("d/f", "other\n"));
+    setsAnOldTime("d/f")(repository_);
+    repository_.git({"update-index", "--refresh"});
+    writesAtTheSameTime("d/f", "large\n")(repository_);
+    expectSwitches();
+}
+
 TEST_F(OverlookedEdits, OfFilesThatCannotBeReadAreKept)
 {
     makeBranch("topic", writes("d/f", "theirs\n") + removes("d/g"));
