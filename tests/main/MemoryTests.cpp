@@ -41,33 +41,34 @@ class Memory : public vclink::test::RemoteFixture
         return after > before ? (after - before) / 10 : 0;
     }
     /// A release that loses memory loses far more than this each time.
-    static void expectNothingLeft(const std::function<void()> &operation)
+    static constexpr std::size_t limit_ = 1024;
+    static void expectNothingLeftByReleasesThatLoseNothing(const std::function<void()> &operation)
     {
-        const std::size_t limit = 1024;
         const std::size_t left = bytesLeftBy(operation);
-        EXPECT_EQ(left > limit, vclink::test::libgit2_release::losesMemory) << left << " bytes";
+        EXPECT_EQ(left > limit_, vclink::test::libgit2_release::losesMemory) << left << " bytes";
     }
 };
 
 TEST_F(Memory, IsNotLostByAFetch)
 {
-    expectNothingLeft([this] { fetch(); });
+    expectNothingLeftByReleasesThatLoseNothing([this] { fetch(); });
 }
 
 TEST_F(Memory, IsNotLostByAListingOfHeads)
 {
-    expectNothingLeft([this] { remote().getRemoteHeads(); });
+    expectNothingLeftByReleasesThatLoseNothing([this] { remote().getRemoteHeads(); });
 }
 
 TEST_F(Memory, IsNotLostByTheDeletionOfABranch)
 {
     commit("file", "text\n");
-    expectNothingLeft(
+    const std::size_t left = bytesLeftBy(
         [this]
         {
             branches().createBranch(git::BranchParameters("short", "main"));
             branches().deleteBranch("short");
         });
+    EXPECT_LE(left, limit_);
 }
 
 } // namespace

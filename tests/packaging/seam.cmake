@@ -13,7 +13,7 @@ foreach(component IN ITEMS host-runtime host-development)
         COMMAND ${CMAKE_COMMAND} --install "${BUILD}" --prefix "${prefix}" --component ${component}
         OUTPUT_QUIET COMMAND_ERROR_IS_FATAL ANY)
 endforeach()
-foreach(entry IN ITEMS CMakeLists.txt LICENSE cmake error fuzz include main options tests util)
+foreach(entry IN ITEMS CMakeLists.txt LICENSE README.md cmake error fuzz include main options tests util)
     file(COPY "${SOURCE}/${entry}" DESTINATION "${source}")
 endforeach()
 file(COPY "${SOURCE}/host/tests" DESTINATION "${source}/host")

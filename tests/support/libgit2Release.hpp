@@ -19,8 +19,7 @@ constexpr bool isSince(int major, int minor)
     return LIBGIT2_VER_MAJOR > major || (LIBGIT2_VER_MAJOR == major && LIBGIT2_VER_MINOR >= minor);
 }
 
-/// Looking a remote up and deleting a branch lose memory, more with every entry of the
-/// configuration.
+/// Looking a remote up loses memory, more with every entry of the configuration.
 constexpr bool losesMemory = !isSince(1, 6);
 
 /// A lock of a configuration file that is not committed also closes the file.
