@@ -20,6 +20,7 @@
 #include "differential/expectedStates.hpp"
 #include "differential/moves.hpp"
 #include "error/errorUtil/callbackException.hpp"
+#include "openHandles.hpp"
 #include "support/NothingLeft.hpp"
 #include "support/libgit2/LibGit2Recorder.hpp"
 #include "support/strings.hpp"
@@ -113,7 +114,7 @@ class FailingFileCall : public vclink::test::FaultFixture
                 const FailingFiles failing(call, error);
                 outcome = outcomeOf(action);
                 function = failing.failed();
-                EXPECT_EQ(recorder.openHandles(), std::vector<std::string>());
+                EXPECT_EQ(vclink::test::openHandles(recorder), std::vector<std::string>());
             }
             trial_.closeWhatLibGit2Leaves();
             if (GetParam().name == "mergeByTool")

@@ -16,6 +16,7 @@
 #include "FaultFixture.hpp"
 #include "error/errorUtil/callbackException.hpp"
 #include "expectedOutcomes.hpp"
+#include "openHandles.hpp"
 #include "support/NothingLeft.hpp"
 #include "support/libgit2/LibGit2Recorder.hpp"
 
@@ -95,7 +96,7 @@ class FailingLibGit2Call : public vclink::test::FaultFixture
             LibGit2Recorder recorder(LibGit2Recorder::InCallbacks::Followed);
             recorder.fail({site.fault});
             outcome = outcomeOf(action);
-            EXPECT_EQ(recorder.openHandles(), std::vector<std::string>());
+            EXPECT_EQ(vclink::test::openHandles(recorder), std::vector<std::string>());
             EXPECT_EQ(recorder.starts(), 0);
             calls = recorder.names();
             steps = recorder.steps();

@@ -41,11 +41,11 @@ class Memory : public vclink::test::RemoteFixture
         return after > before ? (after - before) / 10 : 0;
     }
     /// A release that loses memory loses far more than this each time.
-    static constexpr std::size_t limit_ = 1024;
+    static constexpr std::size_t limit = 1024;
     static void expectNothingLeftByReleasesThatLoseNothing(const std::function<void()> &operation)
     {
         const std::size_t left = bytesLeftBy(operation);
-        EXPECT_EQ(left > limit_, vclink::test::libgit2_release::losesMemory) << left << " bytes";
+        EXPECT_EQ(left > limit, vclink::test::libgit2_release::losesMemory) << left << " bytes";
     }
 };
 
@@ -68,7 +68,7 @@ TEST_F(Memory, IsNotLostByTheDeletionOfABranch)
             branches().createBranch(git::BranchParameters("short", "main"));
             branches().deleteBranch("short");
         });
-    EXPECT_LE(left, limit_);
+    EXPECT_LE(left, limit);
 }
 
 } // namespace
