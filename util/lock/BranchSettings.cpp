@@ -2,12 +2,14 @@
 #include "util/lock/BranchSettings.hpp"
 
 #include <algorithm>
+#include <cerrno>
 #include <cstddef>
 #include <fstream>
 #include <iterator>
 #include <map>
 #include <utility>
 
+#include <fcntl.h>
 #include <git2/config.h>
 #include <git2/deprecated.h> // LIBGIT2_VER_MAJOR, of which 1.8 has made another name
 #include <git2/errors.h>
@@ -15,6 +17,7 @@
 #include <git2/sys/repository.h>
 #include <git2/transaction.h>
 #include <git2/version.h>
+#include <unistd.h>
 
 #include "error/errorUtil/GitResult.hpp"
 #include "error/errorUtil/callbackException.hpp"
@@ -111,6 +114,21 @@ void removeFrom(git_config *config, const std::string &key, const Values &values
     }
 }
 
+/// Returns null if there is no file. libgit2 takes one that it may not read for a missing one, and
+/// fails without a text.
+OwnedHandle<git_config> openFile(const std::string &path)
+{
+    if (::faccessat(AT_FDCWD, path.c_str(), R_OK, AT_EACCESS) != 0)
+    {
+        if (errno == ENOENT)
+        {
+            return nullptr;
+        }
+        raiseGitError(GIT_ERROR, GIT_ERROR_CONFIG, "'" + path + "' cannot be read");
+    }
+    return acquire<git_config>(git_config_open_ondisk, path.c_str()).value();
+}
+
 /// libgit2 would cut off the file there.
 void refuseNulIn(const std::string &path)
 {
@@ -127,12 +145,10 @@ void refuseNulIn(const std::string &path)
 } // namespace
 
 BranchSettings::BranchSettings(git_repository *repository, const std::string &branch)
-    : mode_(pathOfConfiguration(repository)),
-      file_(acquire<git_config>(git_config_open_ondisk, pathOfConfiguration(repository).c_str())
-                .value()),
+    : mode_(pathOfConfiguration(repository)), file_(openFile(pathOfConfiguration(repository))),
       lock_(nullptr, Unlock{&file_})
 {
-    const Settings settings = findSettings(file_.get(), branch);
+    const Settings settings = file_ != nullptr ? findSettings(file_.get(), branch) : Settings();
     if (settings.empty())
     {
         return;

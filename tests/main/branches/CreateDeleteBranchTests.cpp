@@ -266,6 +266,14 @@ TEST_F(DeleteBranch, FailsIfItsSettingsCannotBeRemoved)
     EXPECT_EQ(idOf("topic"), idOf("main"));
 }
 
+TEST_F(DeleteBranch, NeedsNoConfiguration)
+{
+    repository_.git({"branch", "topic"});
+    repository_.remove(".git/config");
+    drop("topic");
+    EXPECT_FALSE(repository_.tryGit({"rev-parse", "--verify", "topic"}).succeeded());
+}
+
 TEST_F(DeleteBranch, FailsForTheCurrentBranchOfThisOrALinkedWorktree)
 {
     repository_.git({"worktree", "add", "--quiet", "-b", "second", (folder() / "linked").string()});
