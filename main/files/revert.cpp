@@ -120,11 +120,9 @@ void refuseConflicts(git_index *index, const PathspecArray &pathspec, const upat
 void resetEntries(git_repository *repository, git_index *index, const git_object *head,
                   const PathspecArray &pathspec, const FileStateMap &states, const upath &root)
 {
-    // Without states, because they could not be read, none was in conflict.
-    if (states.empty())
-    {
-        refuseConflicts(index, pathspec, root);
-    }
+    // Another process may have staged a conflict since the states were read, or libgit2 may not
+    // have been able to read them.
+    refuseConflicts(index, pathspec, root);
     const std::vector<std::string> names = changedNames(states, root);
     resetToHead(repository, head, pathspec, names.size());
     // If a file became a link in the index, or a link a file, the first reset removes it from the

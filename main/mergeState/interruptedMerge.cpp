@@ -57,22 +57,28 @@ bool exists(const std::string &path)
     return isThere;
 }
 
-/// Returns true for the content that libgit2 writes for every merge, and git only for a requested
-/// merge commit.
-bool isModeOfLibGit2(const std::string &path)
+enum class MergeMode
 {
-    const std::string expected = "no-ff";
+    None,
+    /// What libgit2 writes for every merge, and git only for a requested merge commit.
+    OfLibGit2,
+    OfGit
+};
+
+MergeMode readMergeMode(const std::string &path)
+{
+    const std::string ofLibGit2 = "no-ff";
     std::array<char, 16> text{};
     const FileDescriptor file(::open(path.c_str(), O_RDONLY | O_CLOEXEC));
     if (!file && errno == ENOENT)
     {
-        return false;
+        return MergeMode::None;
     }
     if (!file || ::read(file.get(), text.data(), text.size() - 1) < 0)
     {
         raiseSystemError(errno, "could not read '" + path + "'");
     }
-    return text.data() == expected;
+    return text.data() == ofLibGit2 ? MergeMode::OfLibGit2 : MergeMode::OfGit;
 }
 
 OwnedHandle<git_tree> treeOf(const git_commit *commit)
@@ -199,8 +205,10 @@ void refuseInterruptedMerge(git_repository *repository, const git_commit *ours,
     {
         return;
     }
+    const MergeMode mode = readMergeMode(folder + "MERGE_MODE");
     const std::string name = git_oid_tostr_s(git_commit_id(theirs));
-    if (hasMergeMarker(repository, *git_commit_id(theirs)))
+    // If git merges now, the marker is that of an earlier merge, which git has aborted.
+    if (mode != MergeMode::OfGit && hasMergeMarker(repository, *git_commit_id(theirs)))
     {
         raiseGitError(GIT_ERROR, GIT_ERROR_MERGE,
                       "the merge of " + name +
@@ -208,7 +216,7 @@ void refuseInterruptedMerge(git_repository *repository, const git_commit *ours,
                           "leave the rest out. " +
                           wayOut);
     }
-    if (isModeOfLibGit2(folder + "MERGE_MODE") && isNothingTaken(repository, ours, theirs))
+    if (mode == MergeMode::OfLibGit2 && isNothingTaken(repository, ours, theirs))
     {
         raiseGitError(GIT_ERROR, GIT_ERROR_MERGE,
                       "nothing of what only " + name +

@@ -28,10 +28,11 @@ using namespace vclink::test;
 using Names = std::vector<std::string>;
 
 /// The index is read before, to be sure of it.
-const Names ofTheReset =
-    ofTheQuery + Names{"git_repository_open_ext", "git_index_open",   "git_repository_set_index",
-                       "git_index_set_caps",      "git_index_free",   "git_revparse_single",
-                       "git_repository_index",    "git_reset_default"};
+const Names ofTheReset = ofTheQuery + Names{"git_repository_open_ext",  "git_index_open",
+                                            "git_repository_set_index", "git_index_set_caps",
+                                            "git_index_free",           "git_revparse_single",
+                                            "git_repository_index",     "git_index_has_conflicts",
+                                            "git_reset_default"};
 const Names ofTheOptions{"makeCheckoutOptions", "git_checkout_options_init"};
 const Names ofTheCheckout{"git_checkout_index"};
 const Names ofTheRelease{"git_index_free", "git_object_free", "git_repository_free"};
@@ -219,6 +220,22 @@ TEST_F(RevertCalls, AreThoseOfTheQueryAloneWhereAFileIsInConflict)
     calls_.clear();
     EXPECT_THROW(revert({"file", "conflicted"}), TagException<Conflicted>);
     EXPECT_EQ(calls_.steps(), ofTheQuery);
+    EXPECT_THAT(calls_.openHandles(), IsEmpty());
+}
+
+TEST_F(RevertCalls, RefuseAConflictOfAnotherProcessAfterTheQuery)
+{
+    int opened = 0;
+    calls_.on<git_repository_open_ext>(
+        [&](auto...)
+        {
+            if (++opened == 2)
+                beginMerge({"conflicted"});
+        });
+    EXPECT_THROW(revert({"file", "conflicted"}), TagException<Conflicted>);
+    EXPECT_EQ(opened, 2);
+    EXPECT_EQ(repository_.git({"diff", "--name-only", "--diff-filter=U"}), "conflicted\n");
+    EXPECT_THAT(repository_.read("conflicted"), testing::HasSubstr("<<<<<<<"));
     EXPECT_THAT(calls_.openHandles(), IsEmpty());
 }
 
