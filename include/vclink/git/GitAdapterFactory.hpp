@@ -76,9 +76,13 @@ namespace vclink::git
 ///
 /// A file that a sparse checkout leaves out stays as in the index; a file that cannot be read makes
 /// the commit fail. If another process has locked the branch, the commit tries again for
-/// `core.filesRefLockTimeout` milliseconds, 100 by default. It refuses to conclude a merge whose
-/// process was killed, with the class GIT_ERROR_MERGE and a text that describes what to do; nothing
-/// has changed then.
+/// `core.filesRefLockTimeout` milliseconds, 100 by default.
+///
+/// A commit refuses in three cases; nothing has changed then, and the text describes what to do:
+/// - It would conclude a merge whose process was killed. The class is GIT_ERROR_MERGE.
+/// - It would end a merge or rebase for which git has put changes aside (`--autostash`).
+/// - `core.ignorecase` is set, and the index has another name that differs from that of a changed
+///   file only in case.
 ///
 /// After a failure HEAD and the state of a merge are as before, and the changes may be staged. In
 /// two cases the commit exists although an exception is thrown: if the state of the merge cannot be
