@@ -25,10 +25,10 @@ namespace vclink::git
 /// if a call to libgit2 fails, and then nothing has changed. A name or revision with a NUL
 /// character throws with GIT_EINVALIDSPEC before anything is opened.
 ///
-/// switchBranch and merge hold git's index lock while they work. If something else holds it, they
-/// throw with GIT_ELOCKED before anything is written. If another process has locked a reference, an
-/// operation tries again for `core.filesRefLockTimeout` milliseconds: 100 by default, one minute if
-/// negative.
+/// switchBranch and merge hold git's index lock while they work. If something else holds it,
+/// nothing is written: switchBranch throws with GIT_ELOCKED, and merge throws GitException, whose
+/// added text names the lock. If another process has locked a reference, an operation tries again
+/// for `core.filesRefLockTimeout` milliseconds: 100 by default, one minute if negative.
 class VCLINK_GIT_EXPORT BranchManager
 {
   public:
@@ -70,7 +70,8 @@ class VCLINK_GIT_EXPORT BranchManager
     /// branches, and the folders of submodules, even if the branch does not have them.
     ///
     /// Also refuses while a merge, revert, cherry-pick or rebase is under way. Throws with
-    /// GIT_EAMBIGUOUS if a tag has the name of the branch and another commit.
+    /// GIT_EAMBIGUOUS if a tag has the name of the branch and another commit, and for the branch
+    /// "stash" if there is a stash.
     ///
     /// After a failure or a cancellation HEAD is unchanged. The files are too, unless one of them,
     /// or HEAD itself, could not be written. git_branch_lookup, git_revparse_single,
