@@ -83,7 +83,7 @@ reads crashes '300 kills, 281 of them inside an operation; 200 commits kept, not
 commit: killed inside 28, of these left a lock 24, a merge 0
 300 kills, 281 of them inside; 200 commits kept, 111 times locks removed
 END_OF_LOG
-reads situations '1,300 situations, and 33 beside similar names; nothing lost' <<'END_OF_LOG'
+reads situations '1,300 situations, and 33 more with a similar name beside them; nothing lost' <<'END_OF_LOG'
 1000 situations of merge
 300 situations of switch
 33 situations of merge beside siblings
@@ -92,7 +92,7 @@ reads sequences '1,000 sequences; nothing lost' <<'END_OF_LOG'
 seeds 0 to 499
 seeds 500 to 999
 END_OF_LOG
-reads rounds '30 operations done, 12 refused; nothing lost' <<'END_OF_LOG'
+reads rounds '30 operations done, 12 commands of git refused beside them; nothing lost' <<'END_OF_LOG'
 commitBesideGc: the library 10 times done, git 12, refused 5
 commitBesideAdd: the library 20 times done, git 12, refused 7
 END_OF_LOG
@@ -104,7 +104,7 @@ reads coverage '99.7 % of 1,940 lines; 94.1 % of 1,736 branches' <<'END_OF_LOG'
 lines: 99.7% (1934 out of 1940)
 branches: 94.1% (1634 out of 1736)
 END_OF_LOG
-reads mutants '99.4 % of 167 mutants killed, 1 survive' <<'END_OF_LOG'
+reads mutants '99.4 % of 167 mutants killed, 1 survives' <<'END_OF_LOG'
 167 mutants, 166 killed (1 by the time limit): 99.4 %; 1 survive. Not counted: 40
 END_OF_LOG
 reads memcheck '2 programs, no error' <<'END_OF_LOG'
