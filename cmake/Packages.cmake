@@ -68,15 +68,16 @@ set(reason_bogus-mail-host-in-debian-changelog "${reason_bogus-mail-host}")
 set(reason_maintscript-calls-ldconfig "CPack's own scripts, beside the trigger.")
 set(reason_subdir-in-usr-bin "The application looks for its launchers there.")
 
-# vclink_package(COMPONENT NAME SECTION SUMMARY [DEPENDS text] [LINTIAN tag...] [TRIGGERS]): makes a component a
-# package; TRIGGERS is for packages with a shared library.
+# vclink_package(COMPONENT NAME SECTION SUMMARY [DEPENDS text] [SUGGESTS text] [LINTIAN tag...] [TRIGGERS]): makes a
+# component a package; TRIGGERS is for packages with a shared library.
 macro(vclink_package component name section summary)
-    cmake_parse_arguments(package "TRIGGERS" "DEPENDS" "LINTIAN" ${ARGN})
+    cmake_parse_arguments(package "TRIGGERS" "DEPENDS;SUGGESTS" "LINTIAN" ${ARGN})
     string(TOUPPER "${component}" upper)
     set(CPACK_DEBIAN_${upper}_PACKAGE_NAME ${name})
     set(CPACK_DEBIAN_${upper}_PACKAGE_SECTION ${section})
     set(CPACK_COMPONENT_${upper}_DESCRIPTION "${summary}")
     set(CPACK_DEBIAN_${upper}_PACKAGE_DEPENDS "${package_DEPENDS}")
+    set(CPACK_DEBIAN_${upper}_PACKAGE_SUGGESTS "${package_SUGGESTS}")
     if(package_TRIGGERS)
         set(CPACK_DEBIAN_${upper}_PACKAGE_CONTROL_EXTRA "${triggers}")
     endif()
@@ -131,7 +132,9 @@ vclink_package(runtime ${runtime} libs
 vclink_package(development libvclink-git-dev libdevel
     "Git back end of a desktop application, for developers
  Headers, and what finds the library from CMake and from pkg-config."
-    DEPENDS "${runtime} (= ${PROJECT_VERSION}), libvclink-host-dev (>= ${PROJECT_VERSION}), libboost-dev (>= 1.74)")
+    DEPENDS "${runtime} (= ${PROJECT_VERSION}), libvclink-host-dev (>= ${PROJECT_VERSION}), libboost-dev (>= 1.74)"
+    # For hosts that use the type of one result, git_oid.
+    SUGGESTS "libgit2-dev")
 if(VCLINK_BUILD_EXAMPLES)
     set(manual "${PROJECT_BINARY_DIR}/package/vclink-shell.1.gz")
     vclink_compress("${PROJECT_SOURCE_DIR}/examples/shell/vclink-shell.1" "${manual}")

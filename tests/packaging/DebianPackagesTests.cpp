@@ -127,6 +127,7 @@ TEST_F(DebianPackages, ForDevelopmentDependOnTheSameLibraries)
     EXPECT_THAT(field(development, "Depends"),
                 AllOf(HasSubstr(library + " (= " VCLINK_VERSION ")"), HasSubstr(hostDevelopment),
                       HasSubstr("libboost-dev")));
+    EXPECT_EQ(field(development, "Suggests"), "libgit2-dev");
 }
 
 TEST_F(DebianPackages, NameTheLibraryForThoseThatDependOnIt)
