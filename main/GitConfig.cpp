@@ -24,7 +24,7 @@ namespace
 /// If a file can no longer be read or parsed, a look-up frees an entry that it has not found, which
 /// ends the process.
 constexpr bool endsAtBrokenFiles = LIBGIT2_VER_MAJOR > 1 ||
-                                   (LIBGIT2_VER_MAJOR == 1 && LIBGIT2_VER_MINOR >= 8);
+                                   (LIBGIT2_VER_MAJOR == 1 && LIBGIT2_VER_MINOR >= 9);
 
 /// A buffer that libgit2 fills.
 class Buffer

@@ -58,10 +58,9 @@ std::vector<OwnedHandle<git_commit>> lookupMergeHeads(git_repository *repository
     return commits;
 }
 
-/// Throws if the commit was not written. If libgit2 1.5 cannot write the commit's object, for
-/// example on a full disk, it reports success and moves no branch. The only signs are that the
-/// object does not exist, and the error record, which stays until the next call. Returns any other
-/// failure.
+/// Throws if the commit was not written. If libgit2 cannot write the commit's object, for example
+/// on a full disk, it reports success and moves no branch. The only signs are that the object does
+/// not exist, and the error record, which stays until the next call. Returns any other failure.
 GitResult<OwnedHandle<git_object>> lookUpWritten(git_repository *repository, const git_oid &id)
 {
     const GitError failure(GIT_ERROR);

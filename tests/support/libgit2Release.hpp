@@ -9,8 +9,8 @@
 #include <git2/version.h>
 
 /// The differences between releases of libgit2 on which tests depend, a line for each. Tests have
-/// no other conditions on a release. 1.5 and 1.9 were tried: if it is unknown which release between
-/// them brought a difference, it counts as 1.9's.
+/// no other conditions on a release. 1.5 and 1.9 were tried. The releases between them are from
+/// libgit2's history: if it does not show which one brought a difference, it counts as 1.9's.
 namespace vclink::test::libgit2_release
 {
 
@@ -26,7 +26,7 @@ constexpr bool losesMemory = !isSince(1, 6);
 constexpr bool closesLockedFile = !isSince(1, 8);
 
 /// Looking up a value in a file that was broken after it was opened ends the process.
-constexpr bool endsAtBrokenFiles = isSince(1, 8);
+constexpr bool endsAtBrokenFiles = isSince(1, 9);
 
 /// GIT_CHECKOUT_SAFE. 0 is the dry run before.
 constexpr unsigned safeCheckout = isSince(1, 9) ? 0 : 1;
@@ -35,7 +35,7 @@ constexpr unsigned safeCheckout = isSince(1, 9) ? 0 : 1;
 constexpr bool setsRenameThreshold = isSince(1, 4);
 
 /// The code with which a repository of SHA-256 objects is refused.
-constexpr int refusalOfSha256 = isSince(1, 9) ? GIT_EINVALID : GIT_ERROR;
+constexpr int refusalOfSha256 = isSince(1, 6) ? GIT_EINVALID : GIT_ERROR;
 /// The code with which a repository with extensions.worktreeConfig is refused, or 0.
 constexpr int refusalOfWorktreeConfig = isSince(1, 8) ? GIT_OK : GIT_ERROR;
 
@@ -47,10 +47,10 @@ constexpr bool needsNoSafeDirectory = isSince(1, 6);
 constexpr std::string_view endOfOwnedPath = isSince(1, 9) ? "" : "/";
 
 /// What is cut from the ends of the name of a person, besides white space.
-constexpr std::string_view noiseOfNames = isSince(1, 9) ? ",:;" : ".,:;";
+constexpr std::string_view noiseOfNames = isSince(1, 8) ? ",:;" : ".,:;";
 
 /// Between "could not find repository " and the folder.
-constexpr std::string_view whereNoRepositoryIs = isSince(1, 9) ? "at" : "from";
+constexpr std::string_view whereNoRepositoryIs = isSince(1, 7) ? "at" : "from";
 /// A part of the text about an address with an unknown scheme.
 inline std::string refusalOfScheme(const std::string &address)
 {
