@@ -65,6 +65,11 @@ class IndexLockTest : public GitFixture
         ASSERT_EQ(git_index_add_bypath(index.get(), name.c_str()), 0);
         git::writeIndex(index.get());
     }
+    static void stageLocked(git_repository *repository, const std::string &name)
+    {
+        const IndexLock lock(repository);
+        stage(repository, name);
+    }
     /// The files in a folder whose names begin with "index".
     static std::vector<std::string> indexFilesIn(const fs::path &folder)
     {
@@ -207,10 +212,7 @@ TEST_F(IndexLockTest, LeavesNoChangeUnnoticed)
         }
         repository_.write("file", "bbb\n");
         std::this_thread::sleep_for(std::chrono::milliseconds(10));
-        {
-            IndexLock lock(opened.get());
-            stage(opened.get(), "new");
-        }
+        stageLocked(opened.get(), "new");
         EXPECT_EQ(repository_.git({"diff", "--name-only"}), "file\n");
     }
 }
@@ -228,17 +230,11 @@ TEST_F(IndexLockTest, LeavesNoChangeOfTheSameSecondUnnoticed)
     const auto opened = open(repository_);
     repository_.write("file", "aaa\n");
     setTime("file", 100);
-    {
-        IndexLock lock(opened.get());
-        stage(opened.get(), "file");
-    }
+    stageLocked(opened.get(), "file");
     setTime(".git/index", 300);
     repository_.write("file", "bbb\n");
     setTime("file", 500);
-    {
-        IndexLock lock(opened.get());
-        stage(opened.get(), "new");
-    }
+    stageLocked(opened.get(), "new");
     EXPECT_EQ(repository_.git({"diff", "--name-only"}), "file\n");
 }
 
@@ -253,10 +249,7 @@ TEST_F(IndexLockTest, MakesTheFirstIndexOfARepository)
         lock.publish();
     }
     EXPECT_THAT(indexFilesIn(fresh / ".git"), ElementsAre());
-    {
-        IndexLock lock(opened.get());
-        stage(opened.get(), "file");
-    }
+    stageLocked(opened.get(), "file");
     EXPECT_THAT(indexFilesIn(fresh / ".git"), ElementsAre("index"));
     EXPECT_EQ(fresh.git({"ls-files"}), "file\n");
 }
@@ -316,10 +309,7 @@ TEST_F(IndexLockTest, TakesNoNoticeOfWhatAKilledProcessLeft)
     repository_.write(".git/index.vclink", "half of an index");
     repository_.write(".git/index.vclink.lock", "half");
     const auto opened = open(repository_);
-    {
-        IndexLock lock(opened.get());
-        stage(opened.get(), "new");
-    }
+    stageLocked(opened.get(), "new");
     EXPECT_EQ(staged(), "file\nnew\n");
     EXPECT_THAT(indexFiles(), ElementsAre("index"));
     repository_.write(".git/index.vclink", "half of an index");
