@@ -131,7 +131,7 @@ class RemoteBench:
             ROUNDS, before=operation.put_back) for operation in self._operations}
 
     def table(self, counted):
-        table = Table("Remotes, over git:// unless told otherwise", "instructions, floor",
+        table = Table("Remotes, over git:// except where the row says so", "instructions, floor",
                       "library", "library ÷ floor", "time, library ÷ floor",
                       "time, git as a child process ÷ floor")
         for operation in self._operations:
