@@ -24,6 +24,7 @@
 #include "support/text.hpp"
 #include "vclink/git/BranchManager.hpp"
 #include "vclink/git/BranchParameters.hpp"
+#include "vclink/git/GitRemote.hpp"
 
 namespace
 {
@@ -65,9 +66,16 @@ bool isIndexed(const GitRepository &copy, const std::string &path)
     return vclink::test::takeSnapshot(copy.path(), copy.path()).index.count(path + " 0") == 1;
 }
 
-bool holdsReference(const GitRepository &copy, const std::string &name)
+/// Empty for none.
+std::string idOf(const GitRepository &copy, const std::string &name)
 {
-    return copy.tryGit({"rev-parse", "--quiet", "--verify", name}).succeeded();
+    return copy.tryGit({"rev-parse", "--quiet", "--verify", name}).output;
+}
+
+/// The bare repository of the remote "upstream": in the copy, so that each round has its own.
+GitRepository upstreamOf(const GitRepository &copy)
+{
+    return GitRepository(copy / ".git/upstream");
 }
 
 /// Whether another branch than this one has its commit.
@@ -131,9 +139,32 @@ const std::vector<Operation> operations{
      [](const Library &library) {
          library.branches->createBranch({"made", "main"});
      },
-     [](const GitRepository &copy) { return holdsReference(copy, "refs/heads/made"); }},
+     [](const GitRepository &copy) { return !idOf(copy, "refs/heads/made").empty(); }},
     {"deleteBranch", "", [](const Library &library) { library.branches->deleteBranch("gone"); },
-     [](const GitRepository &copy) { return !holdsReference(copy, "refs/heads/gone"); }}};
+     [](const GitRepository &copy) { return idOf(copy, "refs/heads/gone").empty(); }},
+    {"fetch", "",
+     [](const Library &library)
+     { git::GitRemote::create("upstream", *library.adapter)->fetch({}); },
+     [](const GitRepository &copy)
+     {
+         const std::string far = idOf(upstreamOf(copy), "refs/heads/far");
+         return idOf(copy, "refs/remotes/upstream/far^{commit}") == far &&
+                copy.read(".git/FETCH_HEAD").find(far.substr(0, 40)) != std::string::npos;
+     }},
+    {"push", "",
+     [](const Library &library)
+     {
+         git::GitRemote::create("upstream", *library.adapter)
+             ->push({u"refs/heads/ahead:refs/heads/pushed"});
+     },
+     // libgit2 reports success even if it cannot move the tracking branch.
+     [](const GitRepository &copy)
+     {
+         const std::string ahead = idOf(copy, "refs/heads/ahead");
+         const std::string tracking = idOf(copy, "refs/remotes/upstream/pushed");
+         return idOf(upstreamOf(copy), "refs/heads/pushed^{commit}") == ahead &&
+                (tracking.empty() || tracking == ahead);
+     }}};
 
 std::ostream &operator<<(std::ostream &stream, const Operation &operation)
 {
@@ -170,12 +201,14 @@ class TwoProcesses : public vclink::test::GitFixture, public testing::WithParamI
             diverge(origin, "topic", "conflict");
             origin.tryGit({"merge", "--quiet", "topic"});
         }
+        if (GetParam().name == "fetch" || GetParam().name == "push")
+            addUpstream(origin);
     }
 
     void round(const std::string &trade)
     {
         const Operation &operation = GetParam();
-        const GitRepository copy(folder() / "copy");
+        const GitRepository copy(copy_);
         fs::copy(origin_, copy.path(), fs::copy_options::recursive);
         if (!operation.edited.empty())
             copy.write(operation.edited, work);
@@ -243,6 +276,15 @@ class TwoProcesses : public vclink::test::GitFixture, public testing::WithParamI
         copy.write(path == "conflict" ? path : "of main", "of main\n");
         copy.commitAll("ours");
     }
+    /// With a branch "far" that only upstream has.
+    void addUpstream(const GitRepository &origin) const
+    {
+        const GitRepository upstream = upstreamOf(origin);
+        origin.git({"clone", "--quiet", "--bare", "--single-branch", ".", upstream.path()});
+        upstream.git({"branch", "far",
+                      upstream.line({"commit-tree", "-p", "main", "-m", "far", "main^{tree}"})});
+        origin.git({"remote", "add", "upstream", upstreamOf(GitRepository(copy_)).path()});
+    }
     /// What git has acknowledged, and the user's own file.
     static void expectKept(const GitRepository &copy, const std::vector<std::string> &acknowledged,
                            const std::string &edited, const std::string &raised)
@@ -268,6 +310,7 @@ class TwoProcesses : public vclink::test::GitFixture, public testing::WithParamI
 
     vclink::test::LibGit2Session session_{environment()};
     const fs::path origin_ = folder() / "origin";
+    const fs::path copy_ = folder() / "copy";
     vclink::test::Random random_{numberFrom("VCLINK_SEED", 1)};
     std::map<std::string, int> counts_;
     int done_ = 0;
