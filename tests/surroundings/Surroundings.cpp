@@ -315,7 +315,10 @@ bool Surroundings::isForSiblings(const Comparand &comparand)
     const auto &all = surroundingDifferences();
     return std::any_of(all.begin(), all.end(),
                        [&comparand](const SurroundingDifference &difference)
-                       { return difference.isOfSiblings && difference.isAbout(comparand); });
+                       {
+                           return difference.isOfSiblings && difference.obstacles.empty() &&
+                                  difference.isAbout(comparand);
+                       });
 }
 
 bool Surroundings::isExplained(const Comparand &comparand)

@@ -103,7 +103,7 @@ class Surroundings : public GitFixture
                                    const std::filesystem::path &folder) const;
     void expectWorksWithoutObstacle(const Cell &cell, const std::filesystem::path &library);
     bool isExplained(const Comparand &comparand);
-    /// Whether it may be the siblings that are in the way, and not the obstacle.
+    /// Whether the siblings alone are in the way, whatever the obstacle is.
     static bool isForSiblings(const Comparand &comparand);
 
     LibGit2Session session_{environment()};
