@@ -196,6 +196,8 @@ void Surroundings::conclude(const std::string &operation, bool hasSiblings) cons
         std::cout << "  " << count << " x " << outcome << '\n';
     if (std::getenv("VCLINK_CELL") != nullptr)
         return;
+    const bool isLarge = !hasSiblings && (operation == "merge" || operation == "switch");
+    EXPECT_GE(cells_, isLarge ? 200 : 7);
     for (const auto &difference : surroundingDifferences())
     {
         // Beside siblings there are fewer situations, which need not meet the others.
