@@ -5,6 +5,7 @@
 #include <fstream>
 #include <iostream>
 #include <map>
+#include <set>
 #include <string>
 
 #include <gtest/gtest.h>
@@ -92,9 +93,11 @@ TEST_P(ChangeSequences, LeaveWhatGitLeaves)
         run(seed);
     }
     std::cout << "seeds " << first << " to " << first + inBlock - 1 << '\n';
+    std::set<std::string> made;
     for (const auto &[change, count] : counts())
     {
         std::cout << "  " << count << " x " << change << '\n';
+        made.insert(change.substr(0, change.find(", by git")));
     }
     // The suite's own blocks are known to hold every change, others if they are large enough.
     if (inBlock != sequencesInBlock && inBlock < variedSequences)
@@ -102,11 +105,13 @@ TEST_P(ChangeSequences, LeaveWhatGitLeaves)
         return;
     }
     for (const auto *change :
-         {"add", "add: AlreadyAdded", "commit", "commit of a merge", "markResolved", "merge",
-          "merge with conflicts", "remove", "remove: NoFilesToRemove", "revert",
-          "revert: Conflicted", "switch: done", "switch: refused"})
+         {"add", "add: AlreadyAdded", "commit", "commit of a merge", "fast-forward: done",
+          "fast-forward: refused", "markResolved", "merge", "merge by the library: done",
+          "merge by the library: refused", "merge with conflicts", "remove",
+          "remove: NoFilesToRemove", "revert", "revert: Conflicted", "switch: done",
+          "switch: refused"})
     {
-        EXPECT_EQ(counts().count(change), 1u) << change << ": the sequences are too much alike";
+        EXPECT_EQ(made.count(change), 1u) << change << ": the sequences are too much alike";
     }
 }
 
