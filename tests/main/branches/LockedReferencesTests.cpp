@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: MIT
+#include <algorithm>
 #include <chrono>
 #include <filesystem>
 #include <functional>
@@ -144,9 +145,16 @@ TEST_P(LockedReference, FailsOnceTheTimeIsOver)
     const std::string head = repository_.read(".git/HEAD");
     const std::string configuration = repository_.read(".git/config");
     const auto files = workingTreeOf(repository_);
-    const auto begin = Steady::now();
-    EXPECT_EQ(codeOf(), GIT_ELOCKED);
-    EXPECT_GE(Steady::now() - begin, milliseconds(100));
+    // A lock that is held for 500 ms makes it fail. A try takes longer if the machine is busy.
+    Steady::duration shortest = Steady::duration::max();
+    for (int tries = 0; tries < 5 && shortest >= milliseconds(500); ++tries)
+    {
+        const auto begin = Steady::now();
+        EXPECT_EQ(codeOf(), GIT_ELOCKED);
+        shortest = std::min(shortest, Steady::now() - begin);
+    }
+    EXPECT_GE(shortest, milliseconds(100));
+    EXPECT_LT(shortest, milliseconds(500));
     EXPECT_EQ(repository_.read(lock()), "of another process");
     EXPECT_EQ(repository_.git({"for-each-ref"}), references);
     EXPECT_EQ(repository_.read(".git/HEAD"), head);
