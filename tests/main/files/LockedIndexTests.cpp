@@ -81,6 +81,7 @@ TEST_F(LockedIndex, MakesEveryOperationFailBeforeItsFirstWrite)
 TEST_F(LockedIndex, KeepsACallbackFromChangingItMeanwhile)
 {
     makeAhead();
+    makeBranch("diverged", writes("theirs", "x"));
     repository_.write("untracked", "x");
     std::vector<int> codes;
     interactor_->progress.onCall = [&](std::size_t)
@@ -90,10 +91,28 @@ TEST_F(LockedIndex, KeepsACallbackFromChangingItMeanwhile)
                 .code);
         EXPECT_EQ(states(repository_, {"untracked"}).at("untracked"), "Unversioned");
     };
-    branches().switchBranch("topic");
-    EXPECT_THAT(codes, testing::Each(GIT_ELOCKED));
-    EXPECT_THAT(codes, testing::Not(testing::IsEmpty()));
+    const std::vector<std::pair<std::string, std::function<void()>>> operations{
+        {"revert",
+         [&]
+         {
+             repository_.write("other", "edited\n");
+             adapter_->revertFiles({path("other")});
+         }},
+        {"fast-forward", [&] { merge("topic"); }},
+        {"merge", [&] { merge("diverged"); }},
+        {"switch", [&] { branches().switchBranch("topic"); }}};
+    for (const auto &[name, operation] : operations)
+    {
+        SCOPED_TRACE(name);
+        codes.clear();
+        operation();
+        EXPECT_THAT(codes, testing::Each(GIT_ELOCKED));
+        EXPECT_THAT(codes, testing::Not(testing::IsEmpty()));
+    }
+    EXPECT_EQ(repository_.read("other"), "other\n");
     EXPECT_EQ(currentBranch(), "refs/heads/topic");
+    EXPECT_EQ(idOf("main^1"), idOf("topic"));
+    EXPECT_EQ(idOf("main^2"), idOf("diverged"));
     adapter_->addFiles({path("untracked")});
     EXPECT_THAT(status(), testing::ElementsAre("A  untracked"));
 }
