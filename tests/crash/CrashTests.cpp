@@ -115,6 +115,10 @@ class Crash : public GitFixture
     {
         return inside_;
     }
+    std::size_t refusals() const
+    {
+        return sumOf(refused_);
+    }
 
   private:
     microseconds timeOf(const std::string &operation) const
@@ -174,6 +178,7 @@ TEST_F(Crash, LosesNothingAndTheNextOperationWorks)
     report();
     // With fewer kills inside, the test proves nothing.
     EXPECT_GE(sumOf(killsInside()) * 2, kills);
+    EXPECT_GE(refusals(), kills / 300) << "no kill left a merge whose commit is refused";
     for (const auto &operation : operations)
         EXPECT_EQ(killsInside().count(operation), 1U) << "no kill fell into " << operation;
 }
