@@ -11,6 +11,7 @@
 #include <gtest/gtest.h>
 #include <sys/socket.h>
 #include <sys/stat.h>
+#include <sys/sysmacros.h>
 #include <sys/un.h>
 #include <unistd.h>
 
@@ -43,6 +44,18 @@ inline void makeSocket(const std::filesystem::path &path)
 inline Change makesFifo(const std::string &name)
 {
     return [=](const GitRepository &copy) { makeFifo(copy / name); };
+}
+
+/// A character device. Only root makes one with a number, such as that of /dev/null; some file
+/// systems have none without.
+inline Change makesDevice(const std::string &name)
+{
+    return [=](const GitRepository &copy)
+    {
+        const auto make = [&](dev_t number)
+        { return ::mknod((copy / name).c_str(), S_IFCHR | 0644, number) == 0; };
+        ASSERT_TRUE(make(::makedev(1, 3)) || make(0));
+    };
 }
 
 inline Change makesSocket(const std::string &name)

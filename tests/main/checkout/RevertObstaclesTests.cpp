@@ -128,7 +128,7 @@ TEST_F(RevertObstacles, LeavesTrackedAndUntrackedLinksThatAreNotInTheWay)
     EXPECT_EQ(repository_.read("zlast"), "committed");
 }
 
-TEST_F(RevertObstacles, FifosAndSocketsAreReplacedAsGitDoes)
+TEST_F(RevertObstacles, FifosSocketsAndDevicesAreReplacedAsGitDoes)
 {
     repository_.git({"reset", "--quiet", "--hard"});
     repository_.remove("file");
@@ -137,8 +137,10 @@ TEST_F(RevertObstacles, FifosAndSocketsAreReplacedAsGitDoes)
     makeSocket(repository_ / "other");
     repository_.remove("sub");
     makeFifo(repository_ / "sub");
+    repository_.remove("zlast");
+    makesDevice("zlast")(repository_);
     makeFifo(repository_ / "folder/pipe");
-    expectRevertsAsGit({"file", "other", "sub/inside", "folder"});
+    expectRevertsAsGit({"file", "other", "sub/inside", "folder", "zlast"});
     EXPECT_EQ(repository_.git({"status", "--porcelain"}), "");
     EXPECT_TRUE(fs::is_fifo(repository_ / "folder/pipe"));
 }

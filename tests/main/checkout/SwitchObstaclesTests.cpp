@@ -79,9 +79,10 @@ Failure missing(const std::string &what)
 }
 
 const std::vector<RefusedSwitch> refusedSwitches{
-    {"AreOfFifosAndSockets",
+    {"AreOfFifosSocketsAndDevices",
      writesEach({"d/f", "d/new", "n/a"}, "theirs\n") + removes("d/g"),
      {{removes("d/f") + makesFifo("d/f"), inTheWay("FIFO, socket or device 'd/f'")},
+      {removes("d/f") + makesDevice("d/f"), inTheWay("FIFO, socket or device 'd/f'")},
       {removes("d/g") + makesFifo("d/g"), inTheWay("FIFO, socket or device 'd/g'")},
       {makesFifo("d/new"), inTheWay("FIFO, socket or device 'd/new'")},
       {makesFifo("n"), inTheWay("FIFO, socket or device 'n'")},
