@@ -10,6 +10,8 @@
 
 #include "../TestOptionsFactory.hpp"
 #include "ObstacleFixture.hpp"
+#include "error/logging/severity.hpp"
+#include "support/LogCapture.hpp"
 #include "support/text.hpp"
 #include "vclink/util/exception/CancelledOperationException.hpp"
 
@@ -272,7 +274,9 @@ TEST_F(MergeObstacles, ComeAfterACancellation)
     interactor_->cancel();
     expectNothingChanges(
         [this] { EXPECT_EQ(failureOfMerge("topic"), CancelledOperationException().what()); });
+    const LogCapture log(git::SeverityProgress);
     expectMergeRefused(inTheWay("untracked file 'd/new'"));
+    EXPECT_THAT(log.messages(), ElementsAre("Checkout Notify : 1 (d/new)"));
 }
 
 /// Whatever the host's factory gives.

@@ -11,6 +11,8 @@
 
 #include "../TestOptionsFactory.hpp"
 #include "ObstacleFixture.hpp"
+#include "error/logging/severity.hpp"
+#include "support/LogCapture.hpp"
 #include "support/UnprivilegedUser.hpp"
 #include "support/text.hpp"
 #include "vclink/util/exception/CancelledOperationException.hpp"
@@ -266,7 +268,10 @@ TEST_F(SwitchObstacles, ComeAfterACancellation)
     interactor_->cancel();
     expectNothingChanges(
         [this] { EXPECT_THROW(branches().switchBranch("topic"), CancelledOperationException); });
+    const LogCapture log(git::SeverityProgress);
     expectRefused(inTheWay("untracked file 'n'"));
+    const std::string record = "Checkout Notify : 1 (n)";
+    EXPECT_THAT(log.messages(), ElementsAre(record, record));
 }
 
 /// A host's options factory may ask for force, which is what staged changes give way to.
