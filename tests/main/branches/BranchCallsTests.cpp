@@ -60,6 +60,21 @@ TEST_F(CallsOnBranches, AreTheseInOrder)
     }
 }
 
+/// Also if libgit2 gives more than it was asked for.
+TEST_F(CallsOnBranches, ListNoBranchOfTheOtherSide)
+{
+    LibGit2Recorder calls;
+    calls.answer<git_branch_next>(
+        [](auto *next, git_reference **branch, git_branch_t *type, git_branch_iterator *iterator)
+        {
+            const int code = next(branch, type, iterator);
+            *type = GIT_BRANCH_REMOTE;
+            return code;
+        });
+    EXPECT_THAT(namesOf(branches().getLocalBranches()), IsEmpty());
+    EXPECT_THAT(calls.openHandles(), IsEmpty());
+}
+
 /// git has read the branch before it was deleted, and writes its packed references afterwards.
 TEST_F(CallsOnBranches, DeleteABranchAgainThatIsPackedMeanwhile)
 {
