@@ -1,8 +1,10 @@
 // SPDX-License-Identifier: MIT
+#include <algorithm>
 #include <string>
 #include <type_traits>
 #include <vector>
 
+#include <git2.h>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
@@ -73,6 +75,26 @@ TEST_F(BranchLists, HoldTheFullNameOfEachBranchOnceOnItsOwnSideAsGitDoes)
     EXPECT_THAT(remote(), ElementsAre("refs/remotes/origin/main", "refs/remotes/upstream/topic"));
     EXPECT_EQ(remote(), byGit("refs/remotes"));
     EXPECT_EQ(branches().getCurrentBranch().getName(), "main");
+}
+
+/// Which is not that of their names.
+TEST_F(BranchLists, AreInLibGit2sOrder)
+{
+    repository_.commitAll("first");
+    repository_.git({"branch", "a"});
+    repository_.git({"pack-refs", "--all"});
+    repository_.git({"branch", "z"});
+    const auto repository = adapter_->getRepository();
+    git_branch_iterator *iterator = nullptr;
+    ASSERT_EQ(git_branch_iterator_new(&iterator, repository.get(), GIT_BRANCH_LOCAL), 0);
+    std::vector<std::string> expected;
+    git_branch_t type{};
+    git_reference *branch = nullptr;
+    for (; git_branch_next(&branch, &type, iterator) == 0; git_reference_free(branch))
+        expected.emplace_back(git_reference_name(branch));
+    git_branch_iterator_free(iterator);
+    EXPECT_FALSE(std::is_sorted(expected.begin(), expected.end()));
+    EXPECT_EQ(local(), expected);
 }
 
 TEST_F(BranchLists, HoldTheHeadOfAClonedRemoteAsABranchOfItsOwn)
