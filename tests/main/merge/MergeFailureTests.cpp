@@ -44,7 +44,12 @@ class MergeFailure : public MergeFixture
     void mergeRaising(const std::function<void()> &action) const
     {
         const auto factory = std::make_shared<TestOptionsFactory>(interactor_);
-        factory->onMergeOptions = action;
+        factory->onMergeOptions = [&]
+        {
+            // The test's, the adapter's, the manager's and the merge's.
+            EXPECT_EQ(factory.use_count(), 4);
+            action();
+        };
         git::GitAdapter adapter(asPath(repository_.path()), factory);
         git::BranchManager::create(adapter)->merge("topic");
     }
