@@ -19,6 +19,7 @@
 #include "support/LogCapture.hpp"
 #include "support/libgit2/LibGit2Recorder.hpp"
 #include "support/libgit2Release.hpp"
+#include "vclink/git/messageIdentifiers.hpp"
 
 namespace
 {
@@ -250,6 +251,26 @@ TEST_F(CallsOfAMerge, OfTheAnalysisMayFail)
                     testing::IsSupersetOf({"Merge Analysis: ", "Merge Preference: "}));
     }
     EXPECT_THAT(parents(), ElementsAre(head, idOf("topic")));
+}
+
+TEST_F(CallsOfAMerge, OfTheAnalysisDecideByTheirFirstBitAndByThePreferenceWithoutAny)
+{
+    makeDiverged();
+    const NothingChanges nothing(repository_);
+    unsigned bits = GIT_MERGE_ANALYSIS_UNBORN | GIT_MERGE_ANALYSIS_FASTFORWARD;
+    LibGit2Recorder calls;
+    calls.answer<git_merge_analysis>(
+        [&](auto, git_merge_analysis_t *analysis, git_merge_preference_t *preference, auto...)
+        {
+            *analysis = static_cast<git_merge_analysis_t>(bits);
+            *preference = GIT_MERGE_PREFERENCE_FASTFORWARD_ONLY;
+            return 0;
+        });
+    EXPECT_EQ(failureOfMerge("topic"), "GIT_MERGE_ANALYSIS_UNBORN");
+    bits |= GIT_MERGE_ANALYSIS_UP_TO_DATE;
+    EXPECT_NO_THROW(merge("topic"));
+    bits = 0;
+    EXPECT_EQ(failureOfMerge("topic"), textOf(shared_vclink::git::MergePreferenceFastForward()));
 }
 
 /// Those of a merge that has no conflicts, before the commit.
