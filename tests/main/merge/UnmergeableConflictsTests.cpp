@@ -3,11 +3,13 @@
 #include <string>
 #include <vector>
 
+#include <git2/index.h>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include "MergeFixture.hpp"
 #include "error/logging/severity.hpp"
+#include "main/merge/BranchMerger.hpp"
 #include "support/LogCapture.hpp"
 
 namespace
@@ -94,6 +96,14 @@ TEST_F(UnmergeableConflicts, AreNoneAmongTextFilesAndThereIsOneCheckout)
     EXPECT_TRUE(hasMarkers("file"));
     EXPECT_THAT(unmergeableIn(log), IsEmpty());
     EXPECT_EQ(checkoutsIn(log), 1U);
+}
+
+TEST_F(UnmergeableConflicts, AreNoEntriesWithoutAPath)
+{
+    const git_index_entry entry{};
+    std::vector<ustring> paths;
+    git::collectUnmergeable(adapter_->getRepository().get(), paths, &entry);
+    EXPECT_THAT(paths, IsEmpty());
 }
 
 TEST_F(UnmergeableConflicts, ComeToTheSameAsInGitInASecondCheckout)
