@@ -195,7 +195,12 @@ TEST_F(RemoteCalls, OfACloneComeAfterItsRecordItsTextsAndItsOptions)
         toldAtTheOptions = log.messages();
         calls_.note("makeCloneOptions");
     };
+    const unsigned strategy = GIT_CHECKOUT_FORCE | GIT_CHECKOUT_ALLOW_CONFLICTS;
+    factory->cloneOptions.checkoutOptions.checkoutStrategy = strategy;
     git::GitWorkingCopyGenerator generator(std::move(factory));
+    calls_.on<git_clone>(
+        [&](git_repository **, const char *, const char *, const git_clone_options *options)
+        { EXPECT_EQ(options->checkout_opts.checkout_strategy, strategy); });
     calls_.clear();
     const std::string target = folder() / "ordered";
     generator.generate(asUtf16(nameOf(server_)), asPath(target));
