@@ -178,6 +178,18 @@ TEST_F(MergeFailure, OfACancelledCheckoutTellsWhatTheCancellationSays)
     EXPECT_THAT(status(), IsEmpty());
 }
 
+/// libgit2 does not report files in conflict, so nothing asks for the cancellation.
+TEST_F(MergeFailure, OfConflictsAloneLeavesACancellationToTheNextCheckout)
+{
+    diverge(writes("file", "ours\n"), writes("file", "theirs\n"));
+    interactor_->cancel();
+    expectConflicts("topic");
+    repository_.git({"merge", "--abort"});
+    EXPECT_THROW(branches().switchBranch("topic"), CancelledOperationException);
+    branches().switchBranch("topic");
+    EXPECT_THAT(status(), IsEmpty());
+}
+
 TEST_F(MergeFailure, OfAStandardExceptionTellsItsWhatOrItsMessage)
 {
     divergeInTwoFiles();
