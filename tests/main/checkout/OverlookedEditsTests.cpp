@@ -114,6 +114,20 @@ TEST_F(OverlookedEdits, AreNotOtherInodesOfFilteredFiles)
     expectSwitches();
 }
 
+/// As on a file system without symbolic links. libgit2 refuses these itself, edited or not.
+TEST_F(OverlookedEdits, AreNotPlainFilesInThePlaceOfLinks)
+{
+    repository_.commitAll(links("f", "d/link"), "a link");
+    makeBranch("topic", links("g", "d/link"));
+    repository_.git({"config", "core.symlinks", "false"});
+    repository_.remove("d/link");
+    repository_.write("d/link", "f");
+    setsAnOldTime("d/link")(repository_);
+    repository_.git({"update-index", "--refresh"});
+    writesAtTheSameTime("d/link", "f")(repository_);
+    expectRefused(refusal("1 conflict prevents checkout"));
+}
+
 TEST_F(OverlookedEdits, OfFilesThatCannotBeReadAreKept)
 {
     makeBranch("topic", writes("d/f", "theirs\n") + removes("d/g"));
