@@ -19,6 +19,7 @@
 #include "main/checkout/CheckoutWatch.hpp"
 #include "main/merge/BranchMerger.hpp"
 #include "main/mergeState/unfinishedOperation.hpp"
+#include "main/mergeState/workingTrees.hpp"
 #include "options/gitRecords.hpp"
 #include "util/lock/BranchSettings.hpp"
 #include "util/lock/IndexLock.hpp"
@@ -94,14 +95,16 @@ bool isYes(const GitResult<void> &answer)
     return true;
 }
 
-/// Refuses what git_repository_set_head would refuse after the files have been written.
-void refuseCheckedOutElsewhere(const git_reference *branch)
+/// Refuses what git_repository_set_head would refuse after the files have been written, and a
+/// branch that a working tree without its folder has.
+void refuseCheckedOutElsewhere(git_repository *repository, const git_reference *branch)
 {
-    if (isYes(call(git_branch_is_checked_out, branch)) && !isYes(call(git_branch_is_head, branch)))
+    const std::string name = git_reference_name(branch);
+    const bool isElsewhere =
+        isYes(call(git_branch_is_checked_out, branch)) || isCheckedOutElsewhere(repository, name);
+    if (isElsewhere && !isYes(call(git_branch_is_head, branch)))
     {
-        raiseGitError(GIT_ERROR, GIT_ERROR_REPOSITORY,
-                      "cannot set HEAD to reference '" + std::string(git_reference_name(branch)) +
-                          "' as it is the current HEAD of a linked repository.");
+        raiseUsedElsewhere("switch to", name);
     }
 }
 
@@ -180,7 +183,7 @@ void BasicBranchManager::switchBranch(const BranchName &name)
     const OwnedHandle<git_reference> branch = lookupLocalBranch(repository.get(), shortName);
     const OwnedHandle<git_object> target = revparseObject(repository.get(), name).value();
     refuseOtherReference(branch.get(), target.get(), name);
-    refuseCheckedOutElsewhere(branch.get());
+    refuseCheckedOutElsewhere(repository.get(), branch.get());
     refuseSwitchInUnfinishedOperation(repository.get());
     const CheckoutOptions options = optionsFactory_->makeCheckoutOptions();
     git_checkout_options record = toGitCheckoutOptions(options, callbacks_->checkoutCallbacks());

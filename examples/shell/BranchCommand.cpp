@@ -173,6 +173,7 @@ class BranchCommand : public Command
             }
             if (isMeant && !branch.isOwn)
             {
+                refuseMissingFolder(branch);
                 throw ShellFailure(
                     say("Nothing was deleted: '%1%' is checked out in the working copy %2%.\n"
                         "Switch to another branch there first.",

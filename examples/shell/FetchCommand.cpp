@@ -130,6 +130,7 @@ class FetchCommand : public Command
                                        hexadecimal(head.oid) != findRevision(*manager, full);
                             }))
             {
+                refuseMissingFolder(branch);
                 throw ShellFailure(
                     say("Nothing was fetched: that would move the branch '%1%', which is checked "
                         "out in %2%.\nFetch into refs/remotes/%3%/ instead, and merge.",

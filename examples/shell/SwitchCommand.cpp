@@ -48,9 +48,10 @@ void refuseCheckedOut(CMAdapter &adapter, const std::string &name)
     const auto other = findOtherWorkingCopy(nativePath(adapter.getRootFolder()), name);
     if (other)
     {
+        refuseMissingFolder(*other);
         throw ShellFailure(say("Nothing was switched: '%1%' is checked out in the working copy "
                                "%2%.\nWork there, or switch to another branch there first.",
-                               showName(name), quoteName(makePath(*other).string())));
+                               showName(name), quoteName(makePath(other->root).string())));
     }
 }
 

@@ -5,6 +5,9 @@
 #include <fstream>
 #include <system_error>
 
+#include "failures.hpp"
+#include "names.hpp"
+#include "texts.hpp"
 #include "workingCopy.hpp"
 
 namespace vclink::shell
@@ -31,14 +34,13 @@ std::string shortName(const std::string &line)
                                                               : std::string();
 }
 
-/// The root of the working copy whose state is in this folder; empty if it is gone or unknown.
+/// The root of the working copy whose state is in this folder, which may be gone; empty if it is
+/// unknown.
 fs::path rootOf(const fs::path &state)
 {
     const std::string entry = readLine(state / "gitdir");
     const fs::path place = entry.empty() ? state : fs::path(entry);
-    std::error_code ignored;
-    return place.filename() == ".git" && fs::exists(place, ignored) ? place.parent_path()
-                                                                    : fs::path();
+    return place.filename() == ".git" ? place.parent_path() : fs::path();
 }
 
 void take(const fs::path &state, bool isOwn, std::vector<CheckedOutBranch> &branches)
@@ -84,13 +86,26 @@ std::vector<CheckedOutBranch> findCheckedOutBranches(const fs::path &root)
     return branches;
 }
 
-std::optional<fs::path> findOtherWorkingCopy(const fs::path &root, const std::string &branch)
+std::optional<CheckedOutBranch> findOtherWorkingCopy(const fs::path &root,
+                                                     const std::string &branch)
 {
     const std::vector<CheckedOutBranch> branches = findCheckedOutBranches(root);
     const auto found = std::find_if(branches.begin(), branches.end(),
                                     [&branch](const CheckedOutBranch &checkedOut)
                                     { return !checkedOut.isOwn && checkedOut.name == branch; });
-    return found == branches.end() ? std::nullopt : std::optional(found->root);
+    return found == branches.end() ? std::nullopt : std::optional(*found);
+}
+
+void refuseMissingFolder(const CheckedOutBranch &branch)
+{
+    std::error_code ignored;
+    if (!fs::exists(branch.root, ignored))
+    {
+        throw ShellFailure(say("The branch '%1%' is checked out in the working copy %2%, whose "
+                               "folder is missing.\nIf it is gone for good, use \"git worktree "
+                               "prune\" first.",
+                               showName(branch.name), quoteName(makePath(branch.root).string())));
+    }
 }
 
 } // namespace vclink::shell

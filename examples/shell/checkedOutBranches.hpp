@@ -15,19 +15,21 @@ struct CheckedOutBranch
 {
     /// the short name
     std::string name;
-    /// the root of the working copy
+    /// the root of the working copy, which may be gone
     std::filesystem::path root;
     bool isOwn;
 };
 
-/// The branches that the working copies of a repository have checked out. Those whose folders are
-/// gone are left out.
+/// The branches that the working copies of a repository have checked out, also those whose folders
+/// are gone.
 /// @param root of the working copy that asks, whose branches are marked as its own
 std::vector<CheckedOutBranch> findCheckedOutBranches(const std::filesystem::path &root);
 
-/// The root of another working copy of the repository that has a branch checked out; nothing if
-/// none has.
-std::optional<std::filesystem::path> findOtherWorkingCopy(const std::filesystem::path &root,
-                                                          const std::string &branch);
+/// Where another working copy of the repository has a branch checked out; nothing if none has.
+std::optional<CheckedOutBranch> findOtherWorkingCopy(const std::filesystem::path &root,
+                                                     const std::string &branch);
+
+/// @throws ShellFailure if the working copy's folder is missing: the branch is still its own
+void refuseMissingFolder(const CheckedOutBranch &branch);
 
 } // namespace vclink::shell

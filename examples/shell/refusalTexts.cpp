@@ -278,6 +278,13 @@ constexpr Translation refusalRows[] = {
      "切り替えませんでした。'%1%' は作業コピー %2% "
      "でチェックアウトされています。\nそこで作業するか、先にそこで別のブランチに切り替えてください"
      "。"},
+    {"The branch '%1%' is checked out in the working copy %2%, whose folder is missing.\nIf it is "
+     "gone for good, use \"git worktree prune\" first.",
+     "Der Branch '%1%' ist in der Arbeitskopie %2% ausgecheckt, deren Ordner fehlt.\nWenn sie "
+     "endgültig weg ist, benutzen Sie zuerst \"git worktree prune\".",
+     "ブランチ '%1%' は作業コピー %2% "
+     "でチェックアウトされていますが、そのフォルダーがありません。\nもう使わないのであれば、先に "
+     "\"git worktree prune\" を実行してください。"},
     {"There was no other current branch before.", "Vorher gab es keinen anderen aktuellen Branch.",
      "前に現在だった別のブランチはありません。"},
     {"%1% is a bare repository, which has no files. Work in a clone of it.",

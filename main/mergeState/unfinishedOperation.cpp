@@ -1,9 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "main/mergeState/unfinishedOperation.hpp"
 
-#include <array>
 #include <cerrno>
-#include <fstream>
 #include <string>
 
 #include <git2/errors.h>
@@ -12,6 +10,7 @@
 
 #include "error/errorUtil/GitResult.hpp"
 #include "error/errorUtil/raiseGitError.hpp"
+#include "main/mergeState/workingTrees.hpp"
 #include "util/repository/repository.hpp"
 
 namespace vclink::git
@@ -47,13 +46,9 @@ const char *describe(int state)
     }
 }
 
-/// Returns the first line; empty if the file cannot be read.
-std::string firstLineOf(const std::string &path)
+bool isNeeded(const WorkingTree &tree, const std::string &branch)
 {
-    std::ifstream file(path);
-    std::string line;
-    std::getline(file, line);
-    return line;
+    return tree.returnsTo(branch) || tree.moves(branch);
 }
 
 } // namespace
@@ -94,20 +89,19 @@ void refuseCommitWithAutostash(git_repository *repository)
 
 void refuseDeletionInUnfinishedOperation(git_repository *repository, const char *reference)
 {
-    static constexpr std::array<const char *, 3> files{"rebase-merge/head-name",
-                                                       "rebase-apply/head-name", "BISECT_START"};
-    const std::string folder = git_repository_path(repository);
-    const std::string name = reference;
-    for (const char *const file : files)
+    const std::string branch = reference;
+    if (isNeeded(WorkingTree(git_repository_path(repository)), branch))
     {
-        const std::string line = firstLineOf(folder + file);
-        // A bisection has the short name.
-        if (!line.empty() && (line == name || "refs/heads/" + line == name))
+        raiseGitError(GIT_ERROR, GIT_ERROR_REFERENCE,
+                      "cannot delete '" + branch +
+                          "', which a rebase or bisection needs: conclude or abort it first, see "
+                          "git status");
+    }
+    for (const WorkingTree &tree : findOtherWorkingTrees(repository))
+    {
+        if (tree.isLinkedTo(branch) || isNeeded(tree, branch))
         {
-            raiseGitError(GIT_ERROR, GIT_ERROR_REFERENCE,
-                          "cannot delete '" + name +
-                              "', to which a rebase or bisection returns: conclude or abort it "
-                              "first, see git status");
+            raiseUsedElsewhere("delete", branch);
         }
     }
 }

@@ -18,8 +18,8 @@ void refuseSwitchInUnfinishedOperation(git_repository *repository);
 /// @throws LibGit2Exception
 void refuseCommitWithAutostash(git_repository *repository);
 
-/// Throws if a rebase or bisection in this working copy returns to the branch: without it, it could
-/// not be concluded.
+/// Throws if a rebase or bisection returns to the branch or moves it, or if another working tree
+/// has it checked out: neither could be continued without it.
 /// @param reference the full name of the branch
 /// @throws LibGit2Exception
 void refuseDeletionInUnfinishedOperation(git_repository *repository, const char *reference);

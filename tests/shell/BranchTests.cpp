@@ -172,6 +172,8 @@ TEST_F(ShellBranches, AreNotDeletedWhereAWorkingCopyNeedsThem)
               "rebase --continue\", or undo it with \"git rebase --abort\".\n");
     EXPECT_THAT(refs("heads"), ElementsAre("free", "main", "topic"));
     EXPECT_EQ(runIn(linked, {"branch", "-d", "free"}).exitStatus, 0);
+    std::filesystem::rename(linked, folder() / "away");
+    EXPECT_THAT(refuse({"branch", "-d", "topic"}), testing::HasSubstr("whose folder is missing"));
 }
 
 TEST_F(ShellBranches, AreRefusedWithTheReasonAndTheWayOut)

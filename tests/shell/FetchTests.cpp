@@ -148,6 +148,9 @@ TEST_F(ShellFetch, MovesNoBranchThatIsCheckedOut)
     }
     repository_.git({"config", "remote.origin.fetch", "+refs/heads/*:refs/heads/*"});
     EXPECT_THAT(refuse({"fetch"}), StartsWith("Nothing was fetched: that would move the branch"));
+    std::filesystem::rename(linked, folder() / "away");
+    EXPECT_THAT(refuse({"fetch", "origin", "refs/heads/new:side"}),
+                StartsWith("The branch 'side' is checked out in the working copy"));
     succeed({"fetch", "origin", "refs/heads/main:fresh"});
     EXPECT_EQ(references(repository_).at("refs/heads/fresh"),
               references(served_).at("refs/heads/main"));

@@ -112,7 +112,12 @@ TEST_F(ShellSwitch, NamesTheWorkingCopyThatHasTheBranch)
               "vclink-shell: Nothing was switched: 'main' is checked out in the working copy " +
                   repository_.path().string() +
                   ".\nWork there, or switch to another branch there first.\n");
-    std::filesystem::remove_all(place);
+    std::filesystem::rename(place, folder() / "away");
+    EXPECT_EQ(refuse({"switch", "other"}),
+              "The branch 'other' is checked out in the working copy " + place +
+                  ", whose folder is missing.\nIf it is gone for good, use \"git worktree prune\" "
+                  "first.\n");
+    repository_.git({"worktree", "prune"});
     succeed({"switch", "other"});
 }
 

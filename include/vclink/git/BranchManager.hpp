@@ -69,9 +69,10 @@ class VCLINK_GIT_EXPORT BranchManager
     /// an ignored file that the branch tracks. Keeps changes in files that are the same in both
     /// branches, and the folders of submodules, even if the branch does not have them.
     ///
-    /// Also refuses while a merge, revert, cherry-pick or rebase is under way. Throws with
-    /// GIT_EAMBIGUOUS if a tag has the name of the branch and another commit, and for the branch
-    /// "stash" if there is a stash.
+    /// Also refuses while a merge, revert, cherry-pick or rebase is under way, and if another
+    /// working tree of the repository has the branch checked out. Throws with GIT_EAMBIGUOUS if a
+    /// tag has the name of the branch and another commit, and for the branch "stash" if there is a
+    /// stash.
     ///
     /// After a failure or a cancellation HEAD is unchanged. The files are too, unless one of them,
     /// or HEAD itself, could not be written. git_branch_lookup, git_revparse_single,
@@ -86,9 +87,10 @@ class VCLINK_GIT_EXPORT BranchManager
     virtual void createBranch(const BranchParameters &parameters) = 0;
 
     /// Deletes a local branch, merged or not: commits that only it had can be lost. Fails for the
-    /// current branch, and for one to which a rebase or bisection returns. Also removes its
-    /// settings from the repository's own configuration file: if that fails at the end, the branch
-    /// is gone. git_branch_delete, git_config_delete_entry, git_config_delete_multivar.
+    /// current branch of any working tree of the repository, even if its folder is gone, and for
+    /// one that a rebase or bisection needs. Also removes its settings from the repository's own
+    /// configuration file: if that fails at the end, the branch is gone. git_branch_delete,
+    /// git_config_delete_entry, git_config_delete_multivar.
     virtual void deleteBranch(const BranchName &name) = 0;
 
     /// Returns the short name of the current branch, which HEAD points to. Fails if the repository

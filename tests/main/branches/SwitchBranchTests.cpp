@@ -156,9 +156,10 @@ TEST_F(SwitchBranch, MayShareItsNameWithATagOfTheSameCommit)
 TEST_F(SwitchBranch, IsRefusedIfAnotherWorkingCopyHasTheBranch)
 {
     repository_.git({"worktree", "add", "--quiet", "../other copy", "topic"});
-    const Failure failure{GIT_ERROR, GIT_ERROR_REPOSITORY,
-                          "cannot set HEAD to reference 'refs/heads/topic' as it is the "
-                          "current HEAD of a linked repository."};
+    const Failure failure{GIT_ERROR, GIT_ERROR_REFERENCE,
+                          "cannot switch to 'refs/heads/topic', which another working tree has "
+                          "checked out, or needs for a rebase or bisection: see git worktree list "
+                          "('git worktree prune' forgets those whose folders are gone)"};
     expectRefused("topic", failure);
     repository_.git({"checkout", "--quiet", "--detach"});
     {

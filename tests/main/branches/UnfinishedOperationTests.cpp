@@ -96,7 +96,7 @@ TEST_P(UnfinishedBisection, KeepsItsBranch)
     GetParam().begin(repository_);
     EXPECT_EQ(failureOf([&] { branches().deleteBranch("main"); }),
               (Failure{GIT_ERROR, GIT_ERROR_REFERENCE,
-                       "cannot delete 'refs/heads/main', to which a rebase or bisection returns: "
+                       "cannot delete 'refs/heads/main', which a rebase or bisection needs: "
                        "conclude or abort it first, see git status"}));
     EXPECT_TRUE(repository_.tryGit({"rev-parse", "--verify", "refs/heads/main"}).succeeded());
     branches().deleteBranch("aside");

@@ -1,0 +1,190 @@
+// SPDX-License-Identifier: MIT
+#include "main/mergeState/workingTrees.hpp"
+
+#include <algorithm>
+#include <array>
+#include <cerrno>
+#include <fstream>
+#include <memory>
+#include <utility>
+
+#include <dirent.h>
+#include <git2/errors.h>
+#include <git2/repository.h>
+#include <sys/stat.h>
+
+#include "error/errorUtil/raiseGitError.hpp"
+#include "error/errorUtil/raiseSystemError.hpp"
+
+namespace vclink::git
+{
+namespace
+{
+
+[[noreturn]] void raiseUnreadState(const std::string &path, int error)
+{
+    raiseSystemError(error, "could not read '" + path + "'");
+}
+
+bool isAbsent(int error)
+{
+    return error == ENOENT || error == ENOTDIR;
+}
+
+/// Returns the lines without blanks at their ends; none if there is no such file.
+std::vector<std::string> linesOf(const std::string &path)
+{
+    errno = 0;
+    std::ifstream file(path);
+    if (!file && !isAbsent(errno))
+    {
+        raiseUnreadState(path, errno);
+    }
+    std::vector<std::string> lines;
+    for (std::string line; std::getline(file, line);)
+    {
+        line.erase(line.find_last_not_of(" \t\r") + 1);
+        lines.push_back(line);
+    }
+    if (file.bad())
+    {
+        raiseUnreadState(path, EIO);
+    }
+    return lines;
+}
+
+/// Returns an empty text if there is no such file.
+std::string firstLineOf(const std::string &path)
+{
+    const std::vector<std::string> lines = linesOf(path);
+    return lines.empty() ? std::string() : lines.front();
+}
+
+/// Returns the reference that a HEAD names; empty if it is detached.
+std::string referenceIn(const std::string &head)
+{
+    const std::string begin = "ref:";
+    const std::size_t name = head.find_first_not_of(" \t", begin.size());
+    return head.rfind(begin, 0) == 0 && name != std::string::npos ? head.substr(name)
+                                                                  : std::string();
+}
+
+/// git ignores entries without this file's content.
+bool isLinked(const std::string &state)
+{
+    return !firstLineOf(state + "gitdir").empty();
+}
+
+bool isSameFolder(const std::string &one, const std::string &other)
+{
+    struct stat first = {};
+    struct stat second = {};
+    return ::stat(one.c_str(), &first) == 0 && ::stat(other.c_str(), &second) == 0 &&
+           first.st_dev == second.st_dev && first.st_ino == second.st_ino;
+}
+
+/// Returns the paths of what is in a folder, with a slash at their ends; nothing if there is no
+/// such folder.
+std::vector<std::string> foldersIn(const std::string &path)
+{
+    // The standard library's iterators end the process if memory runs out.
+    const std::unique_ptr<DIR, int (*)(DIR *)> folder(::opendir(path.c_str()), ::closedir);
+    if (folder == nullptr && !isAbsent(errno))
+    {
+        raiseUnreadState(path, errno);
+    }
+    std::vector<std::string> folders;
+    errno = 0;
+    while (const dirent *const entry = folder != nullptr ? ::readdir(folder.get()) : nullptr)
+    {
+        const std::string name = entry->d_name;
+        if (name != "." && name != "..")
+        {
+            folders.push_back(path + name + '/');
+        }
+        errno = 0;
+    }
+    if (folder != nullptr && errno != 0)
+    {
+        raiseUnreadState(path, errno);
+    }
+    return folders;
+}
+
+} // namespace
+
+WorkingTree::WorkingTree(std::string state) : state_(std::move(state))
+{
+}
+
+bool WorkingTree::isLinkedTo(const std::string &branch) const
+{
+    return isLinked(state_) && referenceIn(firstLineOf(state_ + "HEAD")) == branch;
+}
+
+bool WorkingTree::returnsTo(const std::string &branch) const
+{
+    static constexpr std::array<const char *, 3> files{"rebase-merge/head-name",
+                                                       "rebase-apply/head-name", "BISECT_START"};
+    return std::any_of(files.begin(), files.end(),
+                       [&](const char *file)
+                       {
+                           const std::string line = firstLineOf(state_ + file);
+                           // A bisection has the short name.
+                           return !line.empty() &&
+                                  (line == branch || "refs/heads/" + line == branch);
+                       });
+}
+
+bool WorkingTree::moves(const std::string &branch) const
+{
+    // The others are the ids before and after.
+    constexpr std::size_t linesOfOne = 3;
+    const std::vector<std::string> lines = linesOf(state_ + "rebase-merge/update-refs");
+    for (std::size_t i = 0; i < lines.size(); i += linesOfOne)
+    {
+        if (lines[i] == branch)
+        {
+            return true;
+        }
+    }
+    return false;
+}
+
+std::vector<WorkingTree> findOtherWorkingTrees(git_repository *repository)
+{
+    const std::string own = git_repository_path(repository);
+    const std::string shared = git_repository_commondir(repository);
+    std::vector<WorkingTree> trees;
+    if (!isSameFolder(shared, own))
+    {
+        trees.emplace_back(shared);
+    }
+    for (const std::string &state : foldersIn(shared + "worktrees/"))
+    {
+        if (!isSameFolder(state, own) && isLinked(state))
+        {
+            trees.emplace_back(state);
+        }
+    }
+    return trees;
+}
+
+bool isCheckedOutElsewhere(git_repository *repository, const std::string &branch)
+{
+    const std::vector<WorkingTree> others = findOtherWorkingTrees(repository);
+    return std::any_of(others.begin(), others.end(),
+                       [&branch](const WorkingTree &tree)
+                       { return tree.isLinkedTo(branch) || tree.returnsTo(branch); });
+}
+
+void raiseUsedElsewhere(const std::string &action, const std::string &branch)
+{
+    raiseGitError(GIT_ERROR, GIT_ERROR_REFERENCE,
+                  "cannot " + action + " '" + branch +
+                      "', which another working tree has checked out, or needs for a rebase or "
+                      "bisection: see git worktree list ('git worktree prune' forgets those whose "
+                      "folders are gone)");
+}
+
+} // namespace vclink::git

@@ -1,0 +1,47 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <string>
+#include <vector>
+
+#include <git2/types.h>
+
+namespace vclink::git
+{
+
+/// What git keeps about one working tree of a repository: its HEAD and an operation under way. The
+/// folder with the files may be gone. References are full names.
+///
+/// Each function throws a LibGit2Exception if something exists and cannot be read.
+class WorkingTree
+{
+  public:
+    /// @param state the folder with the working tree's HEAD
+    explicit WorkingTree(std::string state);
+
+    /// Returns true for a linked working tree that has the branch checked out.
+    bool isLinkedTo(const std::string &branch) const;
+    /// Returns true if a rebase or bisection returns to the branch in the end.
+    bool returnsTo(const std::string &branch) const;
+    /// Returns true if a rebase with `--update-refs` moves the branch in the end.
+    bool moves(const std::string &branch) const;
+
+  private:
+    std::string state_;
+};
+
+/// Returns all other working trees of the repository, as git lists them: libgit2 leaves out the
+/// ones whose folders are gone, for example because they are on another disk.
+/// @throws LibGit2Exception if they cannot be listed
+std::vector<WorkingTree> findOtherWorkingTrees(git_repository *repository);
+
+/// Returns true if another working tree has the branch checked out, or returns to it in the end.
+/// Does not look at the HEAD of the main working tree, which libgit2 finds.
+/// @throws LibGit2Exception if this cannot be found out
+bool isCheckedOutElsewhere(git_repository *repository, const std::string &branch);
+
+/// Throws because another working tree has the branch checked out or needs it.
+/// @param action what cannot be done with it
+[[noreturn]] void raiseUsedElsewhere(const std::string &action, const std::string &branch);
+
+} // namespace vclink::git

@@ -1,0 +1,146 @@
+// SPDX-License-Identifier: MIT
+#include "main/mergeState/workingTrees.hpp"
+
+#include <functional>
+#include <ostream>
+#include <string>
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include "main/files/runScript.hpp"
+#include "main/merge/MergeFixture.hpp"
+#include "vclink/git/LibGit2Exception.hpp"
+
+namespace
+{
+
+using namespace vclink::test;
+
+/// What another working tree does with the branch "topic": a script that runs in the main one.
+struct TreeCase
+{
+    const char *sentence;
+    const char *script;
+    /// whether git refuses a switch to the branch, and its deletion
+    bool isSwitchRefused;
+    bool isDeletionRefused;
+    /// the working tree that asks
+    const char *asking = ".";
+};
+
+void PrintTo(const TreeCase &row, std::ostream *stream)
+{
+    *stream << row.script;
+}
+
+/// "main" and "topic" change the same line of "file".
+class OtherWorkingTree : public MergeFixture, public testing::WithParamInterface<TreeCase>
+{
+  protected:
+    OtherWorkingTree()
+    {
+        diverge(writes("file", "ours\n"), writes("file", "theirs\n"));
+        repository_.git({"branch", "free"});
+    }
+
+    static bool isRefused(const std::function<void()> &action)
+    {
+        try
+        {
+            action();
+            return false;
+        }
+        catch (const vclink::git::LibGit2Exception &)
+        {
+            return true;
+        }
+    }
+};
+
+TEST_P(OtherWorkingTree, KeepsItsBranchAsWithGit)
+{
+    runScript(repository_, GetParam().script);
+    const GitRepository asking(repository_ / GetParam().asking);
+    const std::string id = idOf("topic");
+    const std::string start = asking.line({"rev-parse", "--abbrev-ref", "HEAD"});
+    EXPECT_NE(asking.tryGit({"switch", "topic"}).succeeded(), GetParam().isSwitchRefused);
+    asking.git({"switch", "--quiet", start});
+    EXPECT_NE(asking.tryGit({"branch", "-D", "topic"}).succeeded(), GetParam().isDeletionRefused);
+    repository_.git({"update-ref", "refs/heads/topic", id});
+
+    const auto adapter = makeAdapter(std::filesystem::canonical(asking.path()));
+    const auto manager = vclink::git::BranchManager::create(*adapter);
+    EXPECT_EQ(isRefused([&] { manager->switchBranch("topic"); }), GetParam().isSwitchRefused);
+    manager->switchBranch(start);
+    EXPECT_EQ(isRefused([&] { manager->deleteBranch("topic"); }), GetParam().isDeletionRefused);
+    manager->deleteBranch("free");
+}
+
+const TreeCase treeCases[] = {
+    {"ThatHasItCheckedOut", "git worktree add -q ../other topic", true, true},
+    {"WhoseFolderIsGone", "git worktree add -q ../other topic; mv ../other ../away", true, true},
+    {"ThatIsLockedAndAway",
+     "git worktree add -q ../other topic; git worktree lock ../other; mv ../other ../away", true,
+     true},
+    {"ThatIsForgotten",
+     "git worktree add -q ../other topic; mv ../other ../away; git worktree prune", false, false},
+    {"WithoutItsPlace", "git worktree add -q ../other topic; : >.git/worktrees/other/gitdir", false,
+     false},
+    {"ThatHasAnotherBranch", "git worktree add -q -b another ../other topic; rm -r ../other", false,
+     false},
+    {"ThatRebasesIt", "git worktree add -q ../other topic; cd ../other; ! git rebase main", true,
+     true},
+    {"ThatRebasesItWithPatches",
+     "git worktree add -q ../other topic; cd ../other; ! git rebase --apply main", true, true},
+    {"ThatRebasesItAndIsAway",
+     "git worktree add -q ../other topic; (cd ../other; ! git rebase main); mv ../other ../away",
+     true, true},
+    {"ThatBisectsIt",
+     "git worktree add -q ../other topic; cd ../other; git bisect start; git bisect bad; "
+     "git bisect good main~1; git checkout -q --detach",
+     true, true},
+    {"WhoseRebaseMovesIt",
+     "git worktree add -q -b top ../other topic; cd ../other; "
+     "git -c user.name=x -c user.email=x@y commit -q --allow-empty -m top; "
+     "GIT_SEQUENCE_EDITOR='sed -i 1s/^pick/edit/' git rebase -q -i --update-refs HEAD~2",
+     false, true},
+    {"ThatIsTheMainOne", "git switch -q topic; git worktree add -q -b linked ../other main", true,
+     true, "../other"},
+    {"ThatIsTheMainOneAndRebasesIt",
+     "git switch -q topic; git worktree add -q -b linked ../other main; ! git rebase main", true,
+     true, "../other"},
+};
+
+INSTANTIATE_TEST_SUITE_P(It, OtherWorkingTree, testing::ValuesIn(treeCases),
+                         [](const auto &row) { return row.param.sentence; });
+
+/// As with git: a bare repository has a HEAD, and no files.
+TEST_F(OtherWorkingTree, IsNoBareRepository)
+{
+    runScript(repository_, "git clone -q --bare . ../bare; cd ../bare; "
+                           "git worktree add -q -b linked ../other");
+    const auto adapter = makeAdapter(folder() / "other");
+    vclink::git::BranchManager::create(*adapter)->switchBranch("main");
+}
+
+/// One that cannot be read may have the branch.
+TEST_F(OtherWorkingTree, MustBeReadable)
+{
+    runScript(repository_, "git worktree add -q ../other topic; cd .git/worktrees/other; "
+                           "rm HEAD; mkdir HEAD");
+    const Failure failure = failureOf([this] { branches().deleteBranch("free"); });
+    EXPECT_THAT(failure.text, testing::HasSubstr("worktrees/other/HEAD"));
+}
+
+TEST_F(OtherWorkingTree, OfThisOneIsARebaseThatMovesOtherBranches)
+{
+    runScript(repository_, "git switch -q -c top topic; "
+                           "git -c user.name=x -c user.email=x@y commit -q --allow-empty -m top; "
+                           "GIT_SEQUENCE_EDITOR='sed -i 1s/^pick/edit/' "
+                           "git rebase -q -i --update-refs HEAD~2; ! git branch -D topic");
+    EXPECT_THAT(failureOf([this] { branches().deleteBranch("topic"); }).text,
+                testing::HasSubstr("which a rebase or bisection needs"));
+}
+
+} // namespace
