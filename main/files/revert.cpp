@@ -20,6 +20,7 @@
 #include "main/files/GitAdapter.hpp"
 #include "main/files/ListedFiles.hpp"
 #include "main/files/foldersInIndex.hpp"
+#include "main/files/otherCase.hpp"
 #include "options/gitRecords.hpp"
 #include "util/lock/IndexLock.hpp"
 #include "util/path/PathspecArray.hpp"
@@ -172,6 +173,7 @@ void GitAdapter::revertFiles(const std::vector<upath> &files)
     // The index of the resets and the checkout. Without this call it would be empty if libgit2
     // cannot read the index file, and would then have only these entries.
     const OwnedHandle<git_index> index = getRepositoryIndex(repository.get());
+    refuseOtherCase(index.get(), pathspec.array());
     resetEntries(repository.get(), index.get(), head.has_value() ? head.value().get() : nullptr,
                  pathspec, states, root_);
     const std::shared_ptr<GitOptionsFactory> factory = optionsFactory_;

@@ -8,6 +8,7 @@
 #include "fl/filesystem/operations.hpp"
 #include "main/files/GitAdapter.hpp"
 #include "main/files/foldersInIndex.hpp"
+#include "main/files/otherCase.hpp"
 #include "main/files/prepareAddition.hpp"
 #include "util/lock/IndexLock.hpp"
 #include "util/path/PathspecArray.hpp"
@@ -101,6 +102,7 @@ void GitAdapter::addToIndex(const std::vector<upath> &files)
     IndexLock lock(repository.get());
     const OwnedHandle<git_index> index = getRepositoryIndex(repository.get());
     const PathspecArray pathspec = makeFilePathspec(files, root_);
+    refuseOtherCase(index.get(), pathspec.array());
     HeldEntries held;
     prepareAddition(repository.get(), index.get(), pathspec.array(), held);
     check(git_index_add_all, index.get(), getArrayPointer(pathspec), GIT_INDEX_ADD_DEFAULT,
@@ -122,6 +124,7 @@ void GitAdapter::removeFromIndex(const std::vector<upath> &files, LeftOutFiles l
     IndexLock lock(repository.get());
     const OwnedHandle<git_index> index = getRepositoryIndex(repository.get());
     const PathspecArray pathspec = makeFilePathspec(files, root_);
+    refuseOtherCase(index.get(), pathspec.array());
     if (leftOut == LeftOutFiles::Kept)
     {
         check(git_index_remove_all, index.get(), getArrayPointer(pathspec), skipLeftOut,

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "main/files/otherCase.hpp"
 
+#include <functional>
 #include <string>
 
 #include <git2/errors.h>
@@ -57,6 +58,40 @@ TEST_F(OtherCase, OfAChangedFileIsRefusedInACommit)
             });
         repository_.write(name, before);
     }
+}
+
+/// libgit2 would act on both; git acts on one.
+TEST_F(OtherCase, OfAListedFileIsRefused)
+{
+    repository_.commitAll(writes("README", "other\n"), "both");
+    diverge(writes("README", "ours\n") + writes("readme", "ours\n"),
+            writes("README", "theirs\n") + writes("readme", "theirs\n"));
+    const auto pathOf = [this](const std::string &name) { return asPath(repository_ / name); };
+    const auto expectRefused = [this](const std::function<void()> &operation)
+    {
+        const NothingChanges nothing(repository_);
+        EXPECT_EQ(failureOf(operation),
+                  (Failure{GIT_ERROR, GIT_ERROR_INDEX,
+                           "the names 'README' and 'readme' differ only in case, and "
+                           "'core.ignorecase' is set: use git for them, or set it to false if the "
+                           "file system distinguishes case"}));
+    };
+    ignoreCase();
+    repository_.write("README", "changed\n");
+    repository_.write("file", "changed\n");
+    for (const std::string name : {"README", "readme"})
+    {
+        expectRefused([&] { adapter_->removeFiles({pathOf(name)}); });
+        expectRefused([&] { adapter_->revertFiles({pathOf(name)}); });
+        expectRefused([&] { adapter_->markResolved(pathOf(name)); });
+    }
+    repository_.git({"-c", "core.ignorecase=false", "restore", "README"});
+    adapter_->markResolved(pathOf("file"));
+    adapter_->revertFiles({pathOf("file")});
+    EXPECT_FALSE(repository_.tryGit({"-c", "core.ignorecase=false", "merge", "topic"}).succeeded());
+    expectRefused([&] { adapter_->markResolved(pathOf("readme")); });
+    repository_.remove("readme");
+    expectRefused([&] { adapter_->markResolved(pathOf("readme")); });
 }
 
 } // namespace
