@@ -88,14 +88,43 @@ std::string pathFrom(int (*find)(git_buf *))
     return call(find, path.get()).has_value() ? path.bytes() : std::string();
 }
 
+OwnedHandle<git_config> openDefault()
+{
+    return acquire<git_config>(git_config_open_default).value();
+}
+
+OwnedHandle<git_config> openGlobal(git_config *all)
+{
+    return acquire<git_config>(git_config_open_global, all).value();
+}
+
+/// Sets a value. libgit2 does nothing if the handle has read the same value before, whatever is in
+/// the file now.
+/// @param isMissing whether there is no file
+void setValue(git_config *config, bool isMissing, const char *key, const char *value)
+{
+    if (isMissing)
+    {
+        // A handle keeps what it has read of a file that is gone.
+        const OwnedHandle<git_config> all = openDefault();
+        check(git_config_set_string, openGlobal(all.get()).get(), key, value);
+        return;
+    }
+    // Makes the handle read the file again if it has changed. If that fails, the write decides.
+    static_cast<void>(acquire<git_config>(git_config_snapshot, config));
+    check(git_config_set_string, config, key, value);
+}
+
 void write(git_config *config, const ToolCommand &tool)
 {
     // libgit2 writes one of the two.
-    const KeptMode inXdgFolder(pathFrom(git_config_find_xdg));
-    const KeptMode inHome(pathFrom(git_config_find_global));
+    const std::string xdg = pathFrom(git_config_find_xdg);
+    const std::string global = pathFrom(git_config_find_global);
+    const KeptMode inXdgFolder(xdg);
+    const KeptMode inHome(global);
     const std::string key = configKeyString(tool.key);
     const std::string value = quotedCommand(toolLauncherPath(tool), tool.arguments);
-    check(git_config_set_string, config, asGitString(key), asGitString(value));
+    setValue(config, xdg.empty() && global.empty(), asGitString(key), asGitString(value));
 }
 
 } // namespace
@@ -103,9 +132,8 @@ void write(git_config *config, const ToolCommand &tool)
 struct GitConfig::Impl
 {
     LibGit2Guard guard;
-    OwnedHandle<git_config> defaultConfig = acquire<git_config>(git_config_open_default).value();
-    OwnedHandle<git_config> globalConfig =
-        acquire<git_config>(git_config_open_global, defaultConfig.get()).value();
+    OwnedHandle<git_config> defaultConfig = openDefault();
+    OwnedHandle<git_config> globalConfig = openGlobal(defaultConfig.get());
 };
 
 GitConfig::GitConfig() : impl_(scl::core::memory::make_unique_incomplete<Impl, Impl>())

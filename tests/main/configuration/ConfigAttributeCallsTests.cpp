@@ -105,6 +105,7 @@ TEST_F(ConfigCalls, OfAWriteAReadAndThePathAreOneEach)
 {
     using vclink::test::libgit2_release::endsAtBrokenFiles;
     const InstallPath installation("/opt/host");
+    writeFile(global(), "");
     git::GitConfig config;
     LibGit2Recorder calls;
     config.writeDiffTool();
@@ -113,16 +114,18 @@ TEST_F(ConfigCalls, OfAWriteAReadAndThePathAreOneEach)
     const auto steps = calls.steps();
     if (endsAtBrokenFiles)
     {
-        EXPECT_THAT(steps, ElementsAre("git_config_find_xdg", "git_config_find_global",
-                                       "git_config_set_string", "git_config_snapshot",
-                                       "git_config_get_string_buf", "git_config_free",
-                                       "git_config_find_global"));
+        EXPECT_THAT(steps,
+                    ElementsAre("git_config_find_xdg", "git_config_find_global",
+                                "git_config_snapshot", "git_config_free", "git_config_set_string",
+                                "git_config_snapshot", "git_config_get_string_buf",
+                                "git_config_free", "git_config_find_global"));
     }
     else
     {
-        EXPECT_THAT(steps, ElementsAre("git_config_find_xdg", "git_config_find_global",
-                                       "git_config_set_string", "git_config_get_string_buf",
-                                       "git_config_find_global"));
+        EXPECT_THAT(steps,
+                    ElementsAre("git_config_find_xdg", "git_config_find_global",
+                                "git_config_snapshot", "git_config_free", "git_config_set_string",
+                                "git_config_get_string_buf", "git_config_find_global"));
     }
 }
 

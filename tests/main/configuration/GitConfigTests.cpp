@@ -149,6 +149,24 @@ TEST_F(GitConfigFile, HasAnExistingValueReplaced)
                               "\tmore = x\n[user]\n\tname = Somebody\n");
 }
 
+/// libgit2 skips a write of the value that it has read or written before.
+TEST_F(GitConfigFile, IsWrittenWhateverTheObjectHasReadBefore)
+{
+    GitConfig config;
+    config.writeDiffTool();
+    for (const auto *const now : {"[difftool \"vkDiff\"]\n\tcmd = mine\n", "[user]\n\tname = x\n"})
+    {
+        writeFile(global(), now);
+        config.writeDiffTool();
+        EXPECT_EQ(byGit("difftool.vkDiff.cmd"), diffToolOfOptHost) << now;
+        EXPECT_EQ(shown(config.readDiffTool()), diffToolOfOptHost) << now;
+    }
+    std::filesystem::remove(global());
+    config.writeDiffTool();
+    EXPECT_EQ(byGit("difftool.vkDiff.cmd"), diffToolOfOptHost);
+    EXPECT_EQ(shown(config.readDiffTool()), diffToolOfOptHost);
+}
+
 /// A repository's and the system's configuration, and a subsection in other letters.
 TEST_F(GitConfigFile, OfOthersIsNotSeen)
 {
