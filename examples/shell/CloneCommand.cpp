@@ -80,6 +80,14 @@ void refuseTaken(const std::filesystem::path &folder)
     }
 }
 
+/// The target of a link to a folder: after a failure libgit2 would remove the link.
+std::filesystem::path withoutLinks(const std::filesystem::path &folder)
+{
+    std::error_code error;
+    const std::filesystem::path real = std::filesystem::canonical(folder, error);
+    return error ? folder : real;
+}
+
 /// libgit2 leaves what it has made if it can't even set up the repository, e.g. on a full disk, and
 /// very deep folders.
 /// @param wasThere whether the folder was there before, which was empty then
@@ -164,7 +172,7 @@ class CloneCommand : public Command
         RemoteNotes notes;
         const ExitStatus status =
             runStoppableWithRemote(session, Stops::BeforeWriting, text, notes,
-                                   [&] { generate(*generator, specifier, folder); });
+                                   [&] { generate(*generator, specifier, withoutLinks(folder)); });
         if (status == Done)
         {
             remark(say("Done."));

@@ -164,6 +164,22 @@ TEST_F(ShellClone, RemovesWhatItMadeWhereNothingCanBeWritten)
     EXPECT_TRUE(fs::is_empty(folder() / "empty"));
 }
 
+/// As git. libgit2 fails when it writes the files.
+TEST_F(ShellClone, KeepsALinkToItsFolderIfItFails)
+{
+    GitRepository broken = GitRepository::init(folder() / "broken");
+    broken.write("a", "a\n");
+    broken.commitAll("first");
+    const std::string id = broken.line({"rev-parse", "HEAD:a"});
+    fs::remove(broken / (".git/objects/" + id.substr(0, 2) + '/' + id.substr(2)));
+    fs::create_directory(folder() / "real");
+    fs::create_directory_symlink("real", folder() / "link");
+    const CommandResult result = runIn(folder().path(), {"clone", broken.path().string(), "link"});
+    EXPECT_EQ(result.exitStatus, 1);
+    EXPECT_TRUE(fs::is_symlink(folder() / "link"));
+    EXPECT_TRUE(fs::is_empty(folder() / "real"));
+}
+
 TEST_F(ShellClone, TellsWhyThereIsNothingToClone)
 {
     fs::create_directory(folder() / "nothing");
