@@ -4,6 +4,7 @@
 #include <algorithm>
 #include <cerrno>
 #include <cstddef>
+#include <cstring>
 #include <fstream>
 #include <iterator>
 #include <map>
@@ -129,6 +130,47 @@ OwnedHandle<git_config> openFile(const std::string &path)
     return acquire<git_config>(git_config_open_ondisk, path.c_str()).value();
 }
 
+bool isSpace(char letter)
+{
+    return std::strchr(" \t\r", letter) != nullptr;
+}
+
+/// Returns true for a line with a section's header and a setting, or another header, behind it.
+bool hasSettingBesideHeader(const std::string &line)
+{
+    auto next = std::find_if_not(line.begin(), line.end(), isSpace);
+    if (next == line.end() || *next != '[')
+    {
+        return false;
+    }
+    for (bool isQuoted = false; next != line.end() && (isQuoted || *next != ']'); ++next)
+    {
+        isQuoted = isQuoted != (*next == '"');
+        if (*next == '\\' && next + 1 != line.end())
+        {
+            ++next;
+        }
+    }
+    next = next == line.end() ? next : std::find_if_not(next + 1, line.end(), isSpace);
+    return next != line.end() && *next != '#' && *next != ';';
+}
+
+/// libgit2 would write such a setting twice, or keep the one that is to be removed.
+void refuseSettingsBesideHeadersIn(const std::string &path)
+{
+    std::ifstream file(path);
+    for (std::string line; std::getline(file, line);)
+    {
+        if (hasSettingBesideHeader(line))
+        {
+            raiseGitError(GIT_ERROR, GIT_ERROR_CONFIG,
+                          "'" + path + "' has a setting in the line of the header '" +
+                              line.substr(0, line.find(']') + 1) +
+                              "': remove the branch with 'git branch'");
+        }
+    }
+}
+
 /// libgit2 would cut off the file there.
 void refuseNulIn(const std::string &path)
 {
@@ -154,6 +196,7 @@ BranchSettings::BranchSettings(git_repository *repository, const std::string &br
         return;
     }
     refuseNulIn(pathOfConfiguration(repository));
+    refuseSettingsBesideHeadersIn(pathOfConfiguration(repository));
     git_transaction *raw = nullptr;
     const GitResult<void> locked = call(git_config_lock, &raw, file_.get());
     lock_.reset(raw);

@@ -266,6 +266,29 @@ TEST_F(DeleteBranch, FailsIfItsSettingsCannotBeRemoved)
     EXPECT_EQ(idOf("topic"), idOf("main"));
 }
 
+/// git removes the one and keeps the other. libgit2 would keep the one, or write the other twice.
+TEST_F(DeleteBranch, FailsIfASettingIsInTheLineOfAHeader)
+{
+    repository_.git({"branch", "topic"});
+    const std::string before = repository_.read(".git/config");
+    for (const std::string line :
+         {"[branch \"topic\"] remote = o", "\t[branch \"topic\"]remote=o",
+          "[branch \"topic\"]\n\tremote = o\n[remote \"a]\\\"b\"] url = u",
+          "[branch \"topic\"][user] name = x\n[branch \"topic\"]\n\tremote = o"})
+    {
+        repository_.write(".git/config", before + line + '\n');
+        EXPECT_THAT(failureOfDelete("topic").text, HasSubstr("in the line of the header '"))
+            << line;
+    }
+    repository_.write(".git/config", before + "[remote \"o\"] url = u\n");
+    drop("topic");
+    EXPECT_EQ(repository_.read(".git/config"), before + "[remote \"o\"] url = u\n");
+    repository_.git({"branch", "topic"});
+    repository_.write(".git/config", before + "[branch \"topic\"] # mine\n\tremote = o\n");
+    drop("topic");
+    EXPECT_FALSE(repository_.tryGit({"config", "branch.topic.remote"}).succeeded());
+}
+
 TEST_F(DeleteBranch, NeedsNoConfiguration)
 {
     repository_.git({"branch", "topic"});
