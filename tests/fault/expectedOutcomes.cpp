@@ -210,7 +210,7 @@ std::vector<Tolerance> tolerancesOfOthers(const std::string &operation, const st
         {"globalFilePath", "git_config_find_global", any, any, "done: nothing"},
         {"read", "git_config_get_string_buf", any, any, "done: nothing"},
         {"read", "git_config_snapshot", any, any, "done: nothing"},
-        // Only what is the same as before may not be written then.
+        // The handle then has what it has read before.
         {"write", "git_config_snapshot", any, any, normal},
         // Only the mode of the file is not kept then.
         {"write", "git_config_find_xdg", any, any, normal},
