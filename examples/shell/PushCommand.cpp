@@ -53,7 +53,18 @@ class PushCommand : public Command
                                     : std::vector<std::string>();
         const auto chosen = configured.empty() ? chooseRefspecs(branch) : configured;
         const auto remote = openRemote(session, name, Direction::There);
-        const auto askHeads = [&remote] { return remote->getRemoteHeads(); };
+        const bool isElsewhere = pushesElsewhere(session, name);
+        const auto askHeads = [&]
+        {
+            if (isElsewhere)
+            {
+                throw ShellFailure(say("Nothing was pushed: %1% has another address for pushes, "
+                                       "which cannot be listed. Use full names, e.g. "
+                                       "refs/heads/NAME:refs/heads/NAME.",
+                                       name));
+            }
+            return remote->getRemoteHeads();
+        };
         std::vector<PushRefspec> refspecs;
         RemoteNotes notes;
         const ExitStatus status = runStoppableWithRemote(
@@ -66,6 +77,11 @@ class PushCommand : public Command
                 for (const std::string &text : texts)
                 {
                     refspecs.push_back(readPushRefspec(*manager, text, branch, askHeads));
+                }
+                if (isElsewhere)
+                {
+                    remote->push(readRefspecs(textsOf(refspecs)));
+                    return;
                 }
                 dropWhatIsThere(*manager, *remote, name, refspecs);
                 if (!refspecs.empty())
@@ -129,8 +145,7 @@ class PushCommand : public Command
         refspecs.erase(std::remove_if(refspecs.begin(), refspecs.end(), isThere), refspecs.end());
     }
 
-    static void push(Session &session, git::GitRemote &remote, const std::string &name,
-                     const std::vector<PushRefspec> &refspecs)
+    static std::vector<std::string> textsOf(const std::vector<PushRefspec> &refspecs)
     {
         std::vector<std::string> texts;
         texts.reserve(refspecs.size());
@@ -138,9 +153,15 @@ class PushCommand : public Command
         {
             texts.push_back(refspec.text());
         }
+        return texts;
+    }
+
+    static void push(Session &session, git::GitRemote &remote, const std::string &name,
+                     const std::vector<PushRefspec> &refspecs)
+    {
         try
         {
-            remote.push(readRefspecs(texts));
+            remote.push(readRefspecs(textsOf(refspecs)));
         }
         catch (const git::LibGit2Exception &failure)
         {

@@ -249,6 +249,13 @@ constexpr Translation refusalRows[] = {
      "einen vollen\nNamen, z. B. refs/heads/%1%.",
      "何も送られませんでした。リモートにはブランチもタグも '%1%' がありません。refs/heads/%1% "
      "のような完全な\n名前を使ってください。"},
+    {"Nothing was pushed: %1% has another address for pushes, which cannot be listed. Use full "
+     "names, e.g. refs/heads/NAME:refs/heads/NAME.",
+     "Nichts wurde hochgeladen: Für %1% ist eine andere Adresse zum Hochladen eingestellt, die "
+     "sich "
+     "nicht\nauflisten lässt. Schreiben Sie volle Namen, z. B. refs/heads/NAME:refs/heads/NAME.",
+     "何も送られませんでした。%1% には送信用の別のアドレスがあり、その一覧は取得できません。"
+     "refs/heads/NAME:refs/heads/NAME\nのような完全な名前を使ってください。"},
     {"Deleted %1% at %2%.", "%1% bei %2% gelöscht.", "%2% の %1% を削除しました。"},
     {"Pushed %1% to %2%.", "%1% zu %2% hochgeladen.", "%1% を %2% に送りました。"},
     {"Pushed %1% to %2% at %3%.", "%1% zu %3% hochgeladen, dort %2%.",

@@ -172,6 +172,13 @@ std::unique_ptr<git::GitRemote> openRemote(Session &session, const std::string &
     return git::GitRemote::create(name, adapter);
 }
 
+bool pushesElsewhere(Session &session, const std::string &remote)
+{
+    const auto root = nativePath(session.adapter().getRootFolder());
+    return runGit(root, {"remote", "get-url", "--all", "--", remote}) !=
+           runGit(root, {"remote", "get-url", "--push", "--all", "--", remote});
+}
+
 std::vector<std::string> configuredRefspecs(Session &session, const std::string &remote,
                                             Direction direction)
 {

@@ -37,6 +37,9 @@ std::string chooseRemote(Session &session, const CLI::Option &name, Direction di
 std::unique_ptr<git::GitRemote> openRemote(Session &session, const std::string &name,
                                            Direction direction);
 
+/// Whether a remote has another address for pushes, whose references the back end cannot list.
+bool pushesElsewhere(Session &session, const std::string &remote);
+
 /// What git's settings say that is fetched from a remote or pushed to it.
 std::vector<std::string> configuredRefspecs(Session &session, const std::string &remote,
                                             Direction direction);

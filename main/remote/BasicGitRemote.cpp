@@ -12,6 +12,8 @@
 #include "error/errorUtil/GitResult.hpp"
 #include "error/errorUtil/gitString.hpp"
 #include "main/remote/SigpipeBlock.hpp"
+#include "main/remote/fetchObstacles.hpp"
+#include "main/remote/pushObstacles.hpp"
 #include "options/gitRecords.hpp"
 #include "util/path/PathspecArray.hpp"
 
@@ -23,6 +25,16 @@ namespace
 OwnedHandle<git_remote> lookupRemote(git_repository *repository, const char *name)
 {
     return acquire<git_remote>(git_remote_lookup, repository, name).value();
+}
+
+/// Over a path, libgit2 lists the references at the address for pushes and writes to the other one.
+void useAddressForPushes(git_remote *remote)
+{
+    const char *const address = git_remote_pushurl(remote);
+    if (address != nullptr)
+    {
+        check(git_remote_set_instance_url, remote, address);
+    }
 }
 
 GitRemoteHead::Id copyId(const git_oid &id)
@@ -83,6 +95,7 @@ void BasicGitRemote::fetch(const std::vector<ustring> &refspecs)
     const OwnedHandle<git_remote> remote = lookupRemote(repository.get(), name);
     const FetchOptions options = optionsFactory_->makeFetchOptions();
     const git_fetch_options record = toGitFetchOptions(options, *callbacks_);
+    refuseFetchThatLoses(repository.get(), remote.get(), array, record);
     check(git_remote_fetch, remote.get(), getArrayPointer(array), &record, nullptr);
 }
 
@@ -93,8 +106,10 @@ void BasicGitRemote::push(const std::vector<ustring> &refspecs)
     const PathspecArray array = makeStringPathspec(refspecs);
     const OwnedHandle<git_repository> repository = adapter_.getRepository();
     const OwnedHandle<git_remote> remote = lookupRemote(repository.get(), name);
+    useAddressForPushes(remote.get());
     const PushOptions options = optionsFactory_->makePushOptions();
     const git_push_options record = toGitPushOptions(options, *callbacks_);
+    refusePushThatLoses(repository.get(), remote.get(), array, record);
     check(git_remote_push, remote.get(), getArrayPointer(array), &record);
 }
 

@@ -157,6 +157,33 @@ std::vector<Tolerance> tolerancesOfMerges(const std::string &operation, const st
     };
 }
 
+std::vector<Tolerance> tolerancesOfRemotes(const std::string &normal)
+{
+    return {
+        // It prunes then, and is shallow, for all one knows. So it does and is.
+        {"fetchGuarded", "git_remote_prune_refs", any, any, normal},
+        {"fetchGuarded", "git_repository_is_shallow", any, any, normal},
+        // What is not there can't be lost.
+        {"fetchGuarded", "git_reference_name_to_id", any, GIT_ENOTFOUND, normal},
+        {"pushGuarded", "git_reference_name_to_id", any, GIT_ENOTFOUND, normal},
+        // Below the commits of a shallow repository there are none.
+        {"fetchGuarded", "git_commit_lookup", any, GIT_ENOTFOUND,
+         failure(GIT_ENONFASTFORWARD, GIT_ERROR_REFERENCE,
+                 "'refs/heads/copy' has commits that the remote does not have: fetch into "
+                 "refs/remotes/ and merge, or begin the refspec with '+' to discard them")},
+        {"pushGuarded", "git_commit_lookup", any, GIT_ENOTFOUND,
+         failure(GIT_ERROR, GIT_ERROR_REFERENCE,
+                 "'refs/heads/kept' cannot lose commits at the remote, because "
+                 "receive.denyNonFastForwards is set there: fetch and merge them")},
+        // A setting need not be there.
+        {"pushGuarded", "git_config_get_bool", any, GIT_ENOTFOUND, normal},
+        {"pushGuarded", "git_config_get_string", any, GIT_ENOTFOUND,
+         failure(GIT_ERROR, GIT_ERROR_REFERENCE,
+                 "'refs/heads/kept' is checked out in a linked working tree of the remote: push to "
+                 "another branch")},
+    };
+}
+
 std::vector<Tolerance> tolerancesOfOthers(const std::string &operation, const std::string &normal)
 {
     return {
@@ -223,6 +250,8 @@ std::vector<Tolerance> tolerancesOf(const std::string &operation, const std::str
     std::vector<Tolerance> all = tolerancesOfCommits(operation, normal);
     const std::vector<Tolerance> merges = tolerancesOfMerges(operation, normal);
     all.insert(all.end(), merges.begin(), merges.end());
+    const std::vector<Tolerance> remotes = tolerancesOfRemotes(normal);
+    all.insert(all.end(), remotes.begin(), remotes.end());
     const std::vector<Tolerance> others = tolerancesOfOthers(operation, normal);
     all.insert(all.end(), others.begin(), others.end());
     return all;

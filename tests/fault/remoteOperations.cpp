@@ -27,11 +27,29 @@ Action fetch(const Subject &subject)
     };
 }
 
+Action fetchIntoBranch(const Subject &subject)
+{
+    return [remote = makeOrigin(subject), adapter = subject.adapter]
+    {
+        remote->fetch({u"refs/heads/main:refs/heads/copy"});
+        return std::string();
+    };
+}
+
 Action push(const Subject &subject)
 {
     return [remote = makeOrigin(subject), adapter = subject.adapter]
     {
         remote->push({u"refs/heads/main:refs/heads/ours"});
+        return std::string();
+    };
+}
+
+Action pushTagAndBranch(const Subject &subject)
+{
+    return [remote = makeOrigin(subject), adapter = subject.adapter]
+    {
+        remote->push({u"refs/tags/v1", u"+refs/heads/main:refs/heads/kept"});
         return std::string();
     };
 }
@@ -66,7 +84,9 @@ std::vector<Operation> remoteOperations()
 {
     return {
         {"fetch", makeRemote, fetch},
+        {"fetchGuarded", makeGuardedFetch, fetchIntoBranch},
         {"push", makeRemote, push},
+        {"pushGuarded", makeGuardedPush, pushTagAndBranch},
         {"getRemoteHeads", makeRemote, getRemoteHeads, "", {}, false},
         {"generate",
          makeRemote,

@@ -274,6 +274,26 @@ void makeRemote(GitRepository &repository)
     repository.commitAll(writes("other", "ours\n"), "here");
 }
 
+void makeGuardedFetch(GitRepository &repository)
+{
+    makeRemote(repository);
+    repository.git({"branch", "copy", "main~1"});
+    repository.write(".git/shallow", repository.git({"rev-parse", "copy"}));
+    repository.git({"config", "fetch.prune", "true"});
+}
+
+void makeGuardedPush(GitRepository &repository)
+{
+    makeRemote(repository);
+    const GitRepository origin(repository.path().parent_path() / "origin");
+    repository.git({"tag", "v1", "main~1"});
+    repository.git({"push", "--quiet", "origin", "v1", "v1:refs/heads/kept"});
+    repository.git({"config", "remote.origin.pushurl", origin.path().string()});
+    origin.git({"worktree", "add", "--quiet", "../linked", "kept"});
+    origin.git({"config", "receive.denyCurrentBranch", "ignore"});
+    origin.git({"config", "receive.denyNonFastForwards", "true"});
+}
+
 void makeAttributes(GitRepository &repository)
 {
     makePlain(repository);

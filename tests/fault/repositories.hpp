@@ -72,6 +72,11 @@ void makeConflicted(GitRepository &repository);
 /// Plain with the remote "origin", a bare repository beside it; each of the two has a commit that
 /// the other lacks.
 void makeRemote(GitRepository &repository);
+/// Remote, in a shallow repository that prunes; the branch "copy" is behind the remote's main.
+void makeGuardedFetch(GitRepository &repository);
+/// Remote with an address for pushes and the tag "v1" of both. The remote has a linked working tree
+/// of its branch "kept", which may be pushed to, but must not lose commits.
+void makeGuardedPush(GitRepository &repository);
 /// Plain with attributes.
 void makeAttributes(GitRepository &repository);
 

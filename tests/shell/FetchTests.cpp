@@ -156,6 +156,16 @@ TEST_F(ShellFetch, MovesNoBranchThatIsCheckedOut)
               references(served_).at("refs/heads/main"));
 }
 
+/// As git.
+TEST_F(ShellFetch, DeletesNoBranchThatIsCheckedOut)
+{
+    repository_.git({"checkout", "--quiet", "-b", "topic"});
+    repository_.git({"config", "fetch.prune", "true"});
+    repository_.git({"config", "remote.origin.fetch", "refs/heads/topic:refs/heads/topic"});
+    EXPECT_THAT(refuse({"fetch"}), HasSubstr("pruning would delete 'refs/heads/topic'"));
+    EXPECT_NE(repository_.tryGit({"fetch", "--quiet", "origin"}).exitStatus, 0);
+}
+
 TEST_F(ShellFetch, RefusesWhatIsNoRefspec)
 {
     EXPECT_THAT(refuse({"fetch", "origin", "a:b:c"}), HasSubstr("is not a valid refspec"));

@@ -107,6 +107,31 @@ TEST_F(ShellPush, ReplacesNoTagUnlessToldTo)
     EXPECT_EQ(served("refs/tags/v1"), repository_.line({"rev-parse", "v1"}));
 }
 
+/// What is at the address for fetches says nothing then.
+TEST_F(ShellPush, GoesToTheAddressForPushes)
+{
+    const GitRepository fork(folder() / "fork");
+    repository_.git({"clone", "--quiet", "--bare", served_.path(), fork.path()});
+    succeed({"push", "origin", "main"});
+    repository_.git({"config", "remote.origin.pushurl", fork.path().string()});
+    EXPECT_EQ(show({"push", "origin", "main"}), "Pushed main to origin.\n");
+    EXPECT_EQ(references(fork).at("refs/heads/main"), commit_);
+    const std::string reason =
+        "Nothing was pushed: origin has another address for pushes, which cannot be listed. Use "
+        "full names, e.g. refs/heads/NAME:refs/heads/NAME.\n";
+    EXPECT_EQ(refuse({"push", "origin", ":main"}), reason);
+    succeed({"push", "origin", "main:new"});
+    succeed({"push", "origin", ":refs/heads/new"});
+    EXPECT_EQ(references(fork).count("refs/heads/new"), 0U);
+    repository_.git({"reset", "--quiet", "--hard", "HEAD~"});
+    repository_.write("a", "other\n");
+    repository_.commitAll("other work");
+    EXPECT_THAT(refuse({"push", "origin", "main"}), HasSubstr("non-fastforwardable"));
+    EXPECT_EQ(references(fork).at("refs/heads/main"), commit_);
+    repository_.git({"config", "remote.origin.push", ":"});
+    EXPECT_EQ(refuse({"push", "origin"}), reason);
+}
+
 TEST_F(ShellPush, NamesWhatTheServerRejectsAndPushesTheRest)
 {
     makeHook("update", "case $1 in */main) echo closed; exit 1 ;; esac\n");

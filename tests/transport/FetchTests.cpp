@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include <string>
 
+#include <git2/errors.h>
 #include <gtest/gtest.h>
 
 #include "TransportFixture.hpp"
@@ -9,6 +10,7 @@ namespace
 {
 
 using vclink::test::allTransports;
+using vclink::test::failureOf;
 using vclink::test::GitRepository;
 using vclink::test::referencesOf;
 
@@ -128,6 +130,26 @@ TEST_P(Fetch, TakesWhatTheRefspecsNameOnly)
     fetch(fetched_, {"refs/heads/main:refs/remotes/elsewhere/one"});
     EXPECT_EQ(fetchedId("refs/remotes/elsewhere/one"), id);
     EXPECT_EQ(fetchedId("refs/remotes/origin/other"), "");
+    expectSound(fetched_);
+}
+
+/// libgit2 does not compare the commits: they are downloaded and compared before.
+TEST_P(Fetch, MovesABranchBesideOnlyForward)
+{
+    fetched_.git({"branch", "copy"});
+    fetched_.write("own", "x");
+    const std::string own = fetched_.commitAll("own");
+    const std::string id = change("file", "second\n");
+    publish({"main"});
+    const auto fetchInto = [this](const std::string &branch)
+    {
+        fetched_.git({"config", "remote.origin.fetch", "refs/heads/main:refs/heads/" + branch});
+        fetch(fetched_, {"refs/heads/main"});
+    };
+    EXPECT_EQ(failureOf([&] { fetchInto("main"); }).code, GIT_ENONFASTFORWARD);
+    EXPECT_EQ(fetchedId("refs/heads/main"), own);
+    fetchInto("copy");
+    EXPECT_EQ(fetchedId("refs/heads/copy"), id);
     expectSound(fetched_);
 }
 

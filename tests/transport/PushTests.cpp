@@ -92,6 +92,23 @@ TEST_P(Push, TakesAnAnnotatedTagAlong)
     EXPECT_EQ(servedId("refs/tags/v1"), clone_.line({"rev-parse", "refs/tags/v1"}));
 }
 
+TEST_P(Push, ReplacesATagByForceOnly)
+{
+    clone_.git({"tag", "v1", "main~"});
+    push(clone_, {"refs/tags/v1"});
+    clone_.git({"tag", "--force", "v1"});
+    const auto failure = failureOf(
+        [this] {
+            push(clone_, {"HEAD:refs/heads/new", "refs/tags/v1"});
+        });
+    EXPECT_EQ(failure.code, GIT_ENONFASTFORWARD);
+    EXPECT_EQ(servedId("refs/tags/v1"), first_);
+    EXPECT_EQ(servedId("refs/heads/new"), "");
+    push(clone_, {"refs/tags/v1:refs/tags/v2", "+refs/tags/v1"});
+    EXPECT_EQ(servedId("refs/tags/v1"), second_);
+    EXPECT_EQ(servedId("refs/tags/v2"), second_);
+}
+
 TEST_P(Push, DeletesABranch)
 {
     publish({"main:refs/heads/old"});

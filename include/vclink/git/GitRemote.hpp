@@ -56,13 +56,19 @@ class VCLINK_GIT_EXPORT GitRemote
     /// only if a refspec names it. Does not fail if a refspec without '+' would move a reference to
     /// a commit that is not a descendant; the reference stays.
     ///
+    /// Throws before any reference moves if libgit2 would lose a branch or tag: if pruning would
+    /// delete the target of a refspec without '*' whose source the remote lacks (GIT_ENOTFOUND), if
+    /// a tag would be replaced without a '+' (GIT_EEXISTS), or if a branch would lose commits
+    /// without a '+', in a shallow repository for example (GIT_ENONFASTFORWARD).
+    ///
     /// **Moves a branch even if a working tree has it checked out**, unlike git. The files and the
     /// index stay, so the next commit undoes what the branch got; with '+' local commits may be in
     /// the reflog only. Check the targets of given and configured refspecs before the call.
     ///
     /// After a failure or a cancellation some objects may have been downloaded and some references
     /// moved. A cancellation request that ended a fetch also stops the next checkout of the adapter
-    /// at its first file. git_remote_fetch.
+    /// at its first file. git_remote_fetch; if refspecs and settings can lose something, before it
+    /// git_remote_connect, git_remote_ls, git_remote_download.
     /// @param refspecs used unchanged, e.g. "+refs/heads/*:refs/remotes/origin/*"; an empty list
     /// means the configured ones
     /// @throws vclink::util::exception::CancelledOperationException if the application requested it
@@ -73,9 +79,14 @@ class VCLINK_GIT_EXPORT GitRemote
     ///
     /// Does not fail if the remote rejects a reference by a hook or its settings: the remote's
     /// message is in the log only, and getRemoteHeads() returns the actual reference. Fails, and
-    /// pushes nothing, if a reference cannot be fast-forwarded and its refspec does not begin with
-    /// '+'. A repository on this machine accepts a push only if it is bare, and runs no hooks.
-    /// git_remote_push.
+    /// pushes nothing, if a branch cannot be fast-forwarded or a tag would be replaced, and the
+    /// refspec does not begin with '+' (GIT_ENONFASTFORWARD).
+    ///
+    /// A repository on this machine accepts a push only if it is bare, and runs no hooks. The push
+    /// fails, too, if the repository's receive.denyDeletes or receive.denyNonFastForwards forbid
+    /// it, or if one of its linked working trees has the branch checked out. **What another process
+    /// pushes to the branch at the same moment can be overwritten.** git_remote_push; for a tag
+    /// before it git_remote_connect, git_remote_ls.
     /// @param refspecs used unchanged, with full names, e.g. "refs/heads/main:refs/heads/main";
     /// ":NAME" deletes. An empty list means the configured ones, and pushes nothing if there are
     /// none
@@ -84,6 +95,7 @@ class VCLINK_GIT_EXPORT GitRemote
     virtual void push(const std::vector<ustring> &refspecs) = 0;
 
     /// Returns the references that the remote advertises, in its order; none for an empty remote.
+    /// Lists the address for fetches, also if there is another one for pushes.
     /// git_remote_connect, git_remote_ls.
     virtual std::vector<GitRemoteHead> getRemoteHeads() const = 0;
 };

@@ -92,6 +92,60 @@ TEST_F(RemoteCalls, OfEachOperationComeInOrder)
     }
 }
 
+/// Only a fetch or push that can lose something looks ahead.
+TEST_F(RemoteCalls, AreTheSameIfNothingCanBeLost)
+{
+    repository_.git({"config", "fetch.prune", "true"});
+    const Names fetches[] = {{},
+                             {"+refs/heads/*:refs/remotes/origin/*", "refs/heads/main"},
+                             {"refs/heads/main:refs/remotes/origin/main"},
+                             {"refs/tags/*:refs/tags/*"},
+                             {"+refs/heads/*:refs/copies/*"}};
+    for (const auto &refspecs : fetches)
+    {
+        calls_.clear();
+        fetch(refspecs);
+        EXPECT_EQ(calls_.steps(), ofFetch) << testing::PrintToString(refspecs);
+    }
+    const Names pushes[] = {{},
+                            {"refs/heads/main:refs/heads/a", "refs/heads/main:refs/heads/b"},
+                            {"+refs/heads/main:refs/own/a", "+refs/heads/main:refs/tags/a"},
+                            {":refs/tags/a"}};
+    for (const auto &refspecs : pushes)
+    {
+        calls_.clear();
+        push(refspecs);
+        EXPECT_EQ(calls_.steps(), ofPush) << testing::PrintToString(refspecs);
+    }
+}
+
+TEST_F(RemoteCalls, LookAheadOverTheSameConnection)
+{
+    const auto middle = [this](const std::function<void()> &operation)
+    {
+        calls_.clear();
+        operation();
+        const Names steps = calls_.steps();
+        return Names(steps.begin() + 5, steps.end() - 2);
+    };
+    repository_.git({"tag", "own"});
+    EXPECT_THAT(middle([this] { push({"refs/tags/own"}); }),
+                ElementsAre("git_remote_connect", "git_remote_ls", "git_remote_push"));
+    repository_.git({"config", "remote.origin.tagOpt", "--tags"});
+    EXPECT_THAT(middle([this] { fetch(); }),
+                ElementsAre("git_remote_connect", "git_remote_ls", "git_reference_name_to_id",
+                            "git_remote_fetch"));
+    repository_.git({"config", "remote.origin.tagOpt", "--no-tags"});
+    repository_.git({"branch", "copy", "origin/main"});
+    const std::string id = publish("file", "changed\n");
+    EXPECT_THAT(middle([&] { fetch({id + ":refs/heads/copy"}); }),
+                ElementsAre("git_repository_is_shallow", "git_remote_prune_refs",
+                            "git_remote_connect", "git_remote_ls", "git_reference_name_to_id",
+                            "git_remote_download", "git_reference_name_to_id", "git_commit_lookup",
+                            "git_commit_free", "git_remote_fetch"));
+    EXPECT_THAT(calls_.openHandles(), IsEmpty());
+}
+
 TEST_F(RemoteCalls, AreKeptFromTheSignalOfABrokenConnection)
 {
     Names unguarded;

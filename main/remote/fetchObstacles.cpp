@@ -1,0 +1,143 @@
+// SPDX-License-Identifier: MIT
+#include "main/remote/fetchObstacles.hpp"
+
+#include <algorithm>
+#include <iterator>
+#include <string>
+#include <vector>
+
+#include <git2/errors.h>
+
+#include "error/errorUtil/GitResult.hpp"
+#include "error/errorUtil/raiseGitError.hpp"
+#include "main/remote/Refspec.hpp"
+#include "main/remote/fetchMoves.hpp"
+#include "main/remote/lookAhead.hpp"
+#include "util/path/PathspecArray.hpp"
+#include "util/repository/objectIds.hpp"
+
+namespace vclink::git
+{
+namespace
+{
+
+bool isPruned(const git_remote *remote, const git_fetch_options &options)
+{
+    return options.prune == GIT_FETCH_PRUNE ||
+           (options.prune == GIT_FETCH_PRUNE_UNSPECIFIED && git_remote_prune_refs(remote) != 0);
+}
+
+/// Finds the refspecs without "*" whose targets would be deleted if the remote lacked the sources.
+/// libgit2 passes over such a source, and git fails.
+std::vector<Refspec> findPrunable(git_repository *repository, const git_remote *remote,
+                                  const std::vector<Refspec> &refspecs,
+                                  const git_fetch_options &options)
+{
+    std::vector<Refspec> prunable;
+    std::copy_if(refspecs.begin(), refspecs.end(), std::back_inserter(prunable),
+                 [](const Refspec &refspec)
+                 {
+                     return !refspec.target.empty() && !refspec.isPattern() &&
+                            !isIn(trackingFolder, refspec.target);
+                 });
+    if (!prunable.empty() && !isPruned(remote, options))
+    {
+        return {};
+    }
+    const auto isMissing = [repository](const Refspec &refspec)
+    { return !findId(repository, refspec.target); };
+    prunable.erase(std::remove_if(prunable.begin(), prunable.end(), isMissing), prunable.end());
+    return prunable;
+}
+
+void refusePruning(std::vector<Refspec> prunable, const AdvertisedIds &ids)
+{
+    completeSources(prunable, ids);
+    for (const Refspec &refspec : prunable)
+    {
+        if (ids.count(refspec.source) == 0)
+        {
+            raiseGitError(GIT_ENOTFOUND, GIT_ERROR_REFERENCE,
+                          "the remote has no reference '" + refspec.source +
+                              "', and pruning would delete '" + refspec.target +
+                              "' here: fetch without this refspec, or turn off fetch.prune and "
+                              "remote.NAME.prune");
+        }
+    }
+}
+
+[[noreturn]] void raiseOtherTag(const std::string &name)
+{
+    raiseGitError(GIT_EEXISTS, GIT_ERROR_REFERENCE,
+                  "'" + name +
+                      "' is another tag at the remote, which would replace yours: delete or rename "
+                      "yours, or use 'git fetch --force'");
+}
+
+/// Refuses tags that would be replaced.
+/// @return the branches that would be moved
+std::vector<Move> refuseTags(git_repository *repository, const std::vector<Move> &moves)
+{
+    std::vector<Move> branches;
+    for (const Move &move : moves)
+    {
+        const auto here = findId(repository, move.target);
+        if (!here || isSameId(*here, move.id))
+        {
+            continue;
+        }
+        if (isIn(tagsFolder, move.target))
+        {
+            raiseOtherTag(move.target);
+        }
+        branches.push_back(move);
+    }
+    return branches;
+}
+
+/// @param branches whose new commits are here
+void refuseLostCommits(git_repository *repository, const std::vector<Move> &branches)
+{
+    for (const Move &move : branches)
+    {
+        const auto here = findId(repository, move.target);
+        if (here && !descendsFrom(repository, move.id, *here))
+        {
+            raiseGitError(GIT_ENONFASTFORWARD, GIT_ERROR_REFERENCE,
+                          "'" + move.target +
+                              "' has commits that the remote does not have: fetch into "
+                              "refs/remotes/ and merge, or begin the refspec with '+' to discard "
+                              "them");
+        }
+    }
+}
+
+} // namespace
+
+void refuseFetchThatLoses(git_repository *repository, git_remote *remote,
+                          const PathspecArray &refspecs, const git_fetch_options &options)
+{
+    const FetchSettings settings = readFetchSettings(repository, remote, refspecs.array(), options);
+    const std::vector<Refspec> prunable =
+        findPrunable(repository, remote, settings.active, options);
+    const bool mayMove = mayMoveUnguarded(settings);
+    if (prunable.empty() && !mayMove)
+    {
+        return;
+    }
+    const AdvertisedIds ids =
+        lookAtRemote(remote, GIT_DIRECTION_FETCH, options.callbacks, options.proxy_opts);
+    refusePruning(prunable, ids);
+    if (!mayMove)
+    {
+        return;
+    }
+    const std::vector<Move> branches = refuseTags(repository, findUnguardedMoves(settings, ids));
+    if (!branches.empty())
+    {
+        check(git_remote_download, remote, getArrayPointer(refspecs), &options);
+        refuseLostCommits(repository, branches);
+    }
+}
+
+} // namespace vclink::git

@@ -1,0 +1,186 @@
+// SPDX-License-Identifier: MIT
+#include "main/remote/rejectedPush.hpp"
+
+#include <algorithm>
+#include <array>
+#include <iterator>
+#include <optional>
+#include <set>
+#include <string>
+#include <utility>
+
+#include <git2/config.h>
+#include <git2/errors.h>
+#include <git2/remote.h>
+#include <git2/repository.h>
+#include <strings.h>
+
+#include "error/errorUtil/GitResult.hpp"
+#include "error/errorUtil/raiseGitError.hpp"
+#include "main/remote/lookAhead.hpp"
+#include "main/remote/remotePath.hpp"
+#include "util/repository/objectIds.hpp"
+#include "util/repository/repository.hpp"
+
+namespace vclink::git
+{
+namespace
+{
+
+[[noreturn]] void raiseRejected(const std::string &text)
+{
+    raiseGitError(GIT_ERROR, GIT_ERROR_REFERENCE, text);
+}
+
+OwnedHandle<git_repository> openAt(const std::string &path)
+{
+    return acquire<git_repository>(git_repository_open_ext, path.c_str(),
+                                   unsigned{GIT_REPOSITORY_OPEN_NO_SEARCH}, nullptr)
+        .value();
+}
+
+/// Returns false if the setting does not exist.
+bool isSet(git_config *config, const char *setting)
+{
+    int value = 0;
+    const GitResult<void> found = call(git_config_get_bool, &value, config, setting);
+    if (found.has_error() && found.error().getCode() == GIT_ENOTFOUND)
+    {
+        return false;
+    }
+    check(found);
+    return value != 0;
+}
+
+/// Returns true if a setting such as receive.denyCurrentBranch permits what git denies by default.
+bool permits(git_config *config, const char *setting)
+{
+    static constexpr std::array<const char *, 7> permissions{"ignore", "warn", "false", "no",
+                                                             "off",    "0",    ""};
+    const char *value = nullptr;
+    const GitResult<void> found = call(git_config_get_string, &value, config, setting);
+    if (found.has_error() && found.error().getCode() == GIT_ENOTFOUND)
+    {
+        return false;
+    }
+    check(found);
+    return std::any_of(permissions.begin(), permissions.end(),
+                       [value](const char *permission)
+                       { return ::strcasecmp(value, permission) == 0; });
+}
+
+/// The repository of a remote on this machine.
+class Receiver
+{
+  public:
+    Receiver(std::string path, std::set<std::string> checkedOut)
+        : path_(std::move(path)), checkedOut_(std::move(checkedOut)), repository_(openAt(path_)),
+          config_(acquire<git_config>(git_repository_config_snapshot, repository_.get()).value())
+    {
+    }
+
+    std::optional<git_oid> findBranch(const std::string &name) const
+    {
+        return findId(repository_.get(), name);
+    }
+
+    void refuseCheckedOut(const std::string &branch) const
+    {
+        if (checkedOut_.count(branch) != 0 && !permits(config_.get(), "receive.denyCurrentBranch"))
+        {
+            raiseRejected(
+                "'" + branch +
+                "' is checked out in a linked working tree of the remote: push to another "
+                "branch");
+        }
+    }
+
+    void refuseDeletion(const std::string &branch) const
+    {
+        if (isSet(config_.get(), "receive.denyDeletes"))
+        {
+            raiseRejected("'" + branch +
+                          "' cannot be deleted at the remote, because receive.denyDeletes is set "
+                          "there");
+        }
+        const bool isCurrent = checkedOut_.count(branch) != 0 || findCurrent(path_) == branch;
+        if (isCurrent && !permits(config_.get(), "receive.denyDeleteCurrent"))
+        {
+            raiseRejected("'" + branch +
+                          "' cannot be deleted at the remote, because it is the current branch "
+                          "there");
+        }
+    }
+
+    bool keepsCommits() const
+    {
+        return isSet(config_.get(), "receive.denyNonFastForwards");
+    }
+
+  private:
+    std::string path_;
+    std::set<std::string> checkedOut_;
+    OwnedHandle<git_repository> repository_;
+    OwnedHandle<git_config> config_;
+};
+
+void refuseRejected(const Receiver &receiver, git_repository *repository, const Refspec &refspec)
+{
+    const auto there = receiver.findBranch(refspec.target);
+    if (!there)
+    {
+        return;
+    }
+    if (refspec.source.empty())
+    {
+        receiver.refuseCheckedOut(refspec.target);
+        receiver.refuseDeletion(refspec.target);
+        return;
+    }
+    const git_oid here = *revparseId(refspec.source, repository);
+    if (isSameId(here, *there))
+    {
+        return;
+    }
+    receiver.refuseCheckedOut(refspec.target);
+    // Without a '+' libgit2 compares them itself.
+    if (refspec.isForced && receiver.keepsCommits() && !descendsFrom(repository, here, *there))
+    {
+        raiseRejected("'" + refspec.target +
+                      "' cannot lose commits at the remote, because receive.denyNonFastForwards is "
+                      "set there: fetch and merge them");
+    }
+}
+
+} // namespace
+
+void refuseRejectedPush(git_repository *repository, const git_remote *remote,
+                        const std::vector<Refspec> &refspecs)
+{
+    const char *const address = git_remote_url(remote);
+    const auto path = address != nullptr ? findRemotePath(address) : std::nullopt;
+    if (!path)
+    {
+        return;
+    }
+    const std::set<std::string> checkedOut = findCheckedOut(*path);
+    std::vector<Refspec> suspects;
+    std::copy_if(refspecs.begin(), refspecs.end(), std::back_inserter(suspects),
+                 [&checkedOut](const Refspec &refspec)
+                 {
+                     return isIn(branchesFolder, refspec.target) &&
+                            (refspec.isForced || refspec.source.empty() ||
+                             checkedOut.count(refspec.target) != 0);
+                 });
+    if (suspects.empty())
+    {
+        return;
+    }
+    const Receiver receiver(*path, checkedOut);
+    for (const Refspec &refspec : suspects)
+    {
+        refuseRejected(receiver, repository, refspec);
+    }
+}
+
+} // namespace vclink::git

@@ -1,0 +1,214 @@
+// SPDX-License-Identifier: MIT
+// What a fetch refuses as git does, where libgit2 does not.
+#include <string>
+#include <vector>
+
+#include <git2/errors.h>
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include "RemoteFixture.hpp"
+
+extern "C" __attribute__((weak)) void disableLeakChecks() __asm__("__lsan_disable");
+extern "C" __attribute__((weak)) void enableLeakChecks() __asm__("__lsan_enable");
+
+namespace
+{
+
+/// libgit2 does not release what it has of two histories if a parent is missing.
+class WithoutLeakChecks
+{
+  public:
+    WithoutLeakChecks()
+    {
+        if (disableLeakChecks != nullptr)
+            disableLeakChecks();
+    }
+    WithoutLeakChecks(const WithoutLeakChecks &) = delete;
+    WithoutLeakChecks &operator=(const WithoutLeakChecks &) = delete;
+    ~WithoutLeakChecks()
+    {
+        if (enableLeakChecks != nullptr)
+            enableLeakChecks();
+    }
+};
+
+using testing::HasSubstr;
+using namespace vclink::test;
+using Refspecs = std::vector<std::string>;
+
+/// The branch "copy" is where the server's "main" was, and "own" has a commit of its own on top.
+/// Nothing is checked out.
+class FetchObstacles : public RemoteFixture
+{
+  protected:
+    void start(const std::vector<std::string> &depth = {})
+    {
+        std::vector<std::string> arguments{"fetch", "--quiet"};
+        arguments.insert(arguments.end(), depth.begin(), depth.end());
+        arguments.insert(arguments.end(), {"origin", "main"});
+        repository_.git(arguments);
+        repository_.git({"checkout", "--quiet", "-b", "own", "FETCH_HEAD"});
+        repository_.git({"branch", "copy"});
+        commit("own", "x");
+        repository_.git({"checkout", "--quiet", "--detach"});
+        publish("file", "changed\n");
+    }
+
+    static CommandResult fetchWithGit(const GitRepository &copy, const Refspecs &refspecs)
+    {
+        std::vector<std::string> arguments{"fetch", "--quiet", "origin"};
+        arguments.insert(arguments.end(), refspecs.begin(), refspecs.end());
+        return copy.tryGit(arguments);
+    }
+
+    void expectRefusedAsByGit(const Refspecs &refspecs, int code, const std::string &name) const
+    {
+        SCOPED_TRACE(testing::PrintToString(refspecs));
+        EXPECT_FALSE(fetchWithGit(twin(), refspecs).succeeded());
+        const auto before = references(repository_);
+        const auto failure = failureOf([&] { fetch(refspecs); });
+        EXPECT_EQ(failure.code, code);
+        EXPECT_EQ(failure.errorClass, GIT_ERROR_REFERENCE);
+        EXPECT_THAT(failure.text, HasSubstr('\'' + name + '\''));
+        EXPECT_EQ(references(repository_), before);
+    }
+
+    void expectAsGitDoes(const Refspecs &refspecs) const
+    {
+        SCOPED_TRACE(testing::PrintToString(refspecs));
+        const auto copy = twin();
+        EXPECT_TRUE(fetchWithGit(copy, refspecs).succeeded());
+        fetch(refspecs);
+        EXPECT_EQ(references(repository_), references(copy));
+    }
+
+    /// A tag of the author's at the server, and another one here; both annotated, or none.
+    void tagBoth(const std::string &name, bool isAnnotated)
+    {
+        std::vector<std::string> tag{"-c", "user.name=A", "-c", "user.email=a@b", "tag", "--force"};
+        if (isAnnotated)
+            tag.insert(tag.end(), {"-m", "words"});
+        tag.push_back(name);
+        author_.git(tag);
+        author_.git({"push", "--quiet", "--force", "server", name});
+        tag.push_back("copy");
+        repository_.git(tag);
+    }
+};
+
+TEST_F(FetchObstacles, KeepWhatPruningWouldDeleteForAMissingSource)
+{
+    start();
+    const std::string all = "+refs/heads/*:refs/remotes/origin/*";
+    for (const auto *const setting : {"fetch.prune", "remote.origin.prune"})
+    {
+        repository_.git({"config", setting, "true"});
+        for (const Refspecs &refspecs :
+             {Refspecs{"refs/heads/own:refs/heads/own"}, {"+own:own"}, {all, "gone:copy"}})
+            expectRefusedAsByGit(refspecs, GIT_ENOTFOUND,
+                                 "refs/heads/" + std::string(refspecs.size() > 1 ? "copy" : "own"));
+        repository_.git({"config", "remote.origin.fetch", "refs/heads/own:refs/heads/own"});
+        expectRefusedAsByGit({}, GIT_ENOTFOUND, "refs/heads/own");
+        repository_.git({"config", "remote.origin.fetch", all});
+        expectAsGitDoes({"refs/heads/main:refs/heads/copy"});
+        expectAsGitDoes({"main:copy", all});
+        expectAsGitDoes({});
+        // Nothing of the user's is lost.
+        fetch({"refs/heads/gone:refs/remotes/origin/gone"});
+        fetch({"refs/heads/gone:refs/heads/new"});
+        repository_.git({"config", "--unset", setting});
+    }
+    const auto before = references(repository_);
+    fetch({"refs/heads/own:refs/heads/own"});
+    EXPECT_EQ(references(repository_), before);
+}
+
+TEST_F(FetchObstacles, KeepTagsThatAreOthersAtTheRemote)
+{
+    start();
+    repository_.git({"fetch", "--quiet", "origin"});
+    for (const bool isAnnotated : {false, true})
+    {
+        tagBoth("v1", isAnnotated);
+        const std::string name = "refs/tags/v1";
+        repository_.git({"config", "remote.origin.tagOpt", "--tags"});
+        expectRefusedAsByGit({}, GIT_EEXISTS, name);
+        expectRefusedAsByGit({"refs/heads/main:refs/own/main"}, GIT_EEXISTS, name);
+        repository_.git({"config", "remote.origin.tagOpt", "--no-tags"});
+        for (const auto *const refspec :
+             {"refs/tags/v1:refs/tags/v1", "refs/tags/*:refs/tags/*", "refs/*:refs/*"})
+            expectRefusedAsByGit({refspec}, GIT_EEXISTS, name);
+        expectRefusedAsByGit({"refs/heads/main:refs/tags/v1"}, GIT_EEXISTS, name);
+        expectAsGitDoes({});
+        // libgit2 keeps the tag itself.
+        repository_.git({"config", "--unset", "remote.origin.tagOpt"});
+        expectAsGitDoes({});
+        const auto before = references(repository_);
+        fetch({"refs/tags/v1:refs/tags/v1"});
+        EXPECT_EQ(references(repository_), before);
+    }
+}
+
+TEST_F(FetchObstacles, ReplaceTagsByForceAndTakeNewOnes)
+{
+    start();
+    tagBoth("v1", true);
+    repository_.git({"config", "remote.origin.tagOpt", "--no-tags"});
+    expectAsGitDoes({"+refs/tags/*:refs/tags/*"});
+    EXPECT_EQ(idOf("refs/tags/v1"), idOf("refs/tags/v1", server_));
+    tagBoth("v2", false);
+    repository_.git({"config", "remote.origin.tagOpt", "--tags"});
+    repository_.git({"config", "--add", "remote.origin.fetch", "+refs/tags/*:refs/tags/*"});
+    expectAsGitDoes({});
+    EXPECT_EQ(idOf("refs/tags/v2"), idOf("refs/tags/v2", server_));
+    repository_.git({"config", "--unset", "remote.origin.fetch", "tags"});
+    author_.git({"tag", "v3"});
+    author_.git({"push", "--quiet", "server", "v3"});
+    expectAsGitDoes({});
+}
+
+TEST_F(FetchObstacles, KeepCommitsInAShallowRepository)
+{
+    publish("file", "once more\n");
+    start({"--depth=1"});
+    const std::string own = "refs/heads/main:refs/heads/own";
+    expectRefusedAsByGit({own}, GIT_ENONFASTFORWARD, "refs/heads/own");
+    expectRefusedAsByGit({"main:own"}, GIT_ENONFASTFORWARD, "refs/heads/own");
+    {
+        const WithoutLeakChecks without;
+        expectAsGitDoes({"refs/heads/main:refs/heads/copy", "refs/heads/main:refs/heads/new"});
+    }
+    EXPECT_EQ(idOf("copy"), idOf("main", author_));
+    expectAsGitDoes({"refs/heads/main:refs/heads/copy"});
+    expectAsGitDoes({'+' + own});
+    EXPECT_EQ(idOf("own"), idOf("main", author_));
+}
+
+/// libgit2 compares no commits for them.
+TEST_F(FetchObstacles, KeepCommitsFromConfiguredRefspecsAndIds)
+{
+    start();
+    const std::string id = idOf("main", author_);
+    expectRefusedAsByGit({id + ":refs/heads/own"}, GIT_ENONFASTFORWARD, "refs/heads/own");
+    repository_.git({"config", "remote.origin.fetch", "refs/heads/main:refs/heads/own"});
+    expectRefusedAsByGit({"refs/heads/main"}, GIT_ENONFASTFORWARD, "refs/heads/own");
+    repository_.git({"config", "remote.origin.fetch", "refs/heads/main:refs/heads/copy"});
+    expectAsGitDoes({"refs/heads/main"});
+    EXPECT_EQ(idOf("copy"), id);
+    repository_.git({"branch", "--force", "copy", "copy~"});
+    expectAsGitDoes({id + ":refs/heads/copy"});
+    expectAsGitDoes({'+' + id + ":refs/heads/own"});
+    EXPECT_EQ(idOf("own"), id);
+}
+
+/// libgit2 would give a branch the id of the tag.
+TEST_F(FetchObstacles, KeepABranchFromATag)
+{
+    start();
+    tagBoth("v1", true);
+    repository_.git({"config", "remote.origin.tagOpt", "--no-tags"});
+    expectRefusedAsByGit({"refs/tags/v1:refs/heads/own"}, GIT_ENONFASTFORWARD, "refs/heads/own");
+}
+
+} // namespace
