@@ -115,7 +115,9 @@ TEST_F(FetchObstacles, KeepWhatPruningWouldDeleteForAMissingSource)
         expectAsGitDoes({"main:copy", all});
         expectAsGitDoes({});
         // Nothing of the user's is lost.
+        repository_.git({"update-ref", "refs/remotes/origin/gone", "own"});
         fetch({"refs/heads/gone:refs/remotes/origin/gone"});
+        EXPECT_FALSE(repository_.tryGit({"rev-parse", "--verify", "origin/gone"}).succeeded());
         fetch({"refs/heads/gone:refs/heads/new"});
         repository_.git({"config", "--unset", setting});
     }
@@ -178,9 +180,9 @@ TEST_F(FetchObstacles, KeepCommitsInAShallowRepository)
     {
         const WithoutLeakChecks without;
         expectAsGitDoes({"refs/heads/main:refs/heads/copy", "refs/heads/main:refs/heads/new"});
+        expectAsGitDoes({"refs/heads/main:refs/heads/copy"});
     }
     EXPECT_EQ(idOf("copy"), idOf("main", author_));
-    expectAsGitDoes({"refs/heads/main:refs/heads/copy"});
     expectAsGitDoes({'+' + own});
     EXPECT_EQ(idOf("own"), idOf("main", author_));
 }
