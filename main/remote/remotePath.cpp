@@ -4,20 +4,19 @@
 #include <cerrno>
 #include <charconv>
 #include <cstddef>
-#include <filesystem>
 #include <fstream>
 #include <string_view>
-#include <system_error>
+
+#include <unistd.h>
 
 #include "error/errorUtil/raiseSystemError.hpp"
+#include "main/checkout/standing.hpp"
 #include "main/remote/Refspec.hpp"
 
 namespace vclink::git
 {
 namespace
 {
-
-namespace fs = std::filesystem;
 
 /// Replaces "%20" and the like.
 std::string decode(std::string_view text)
@@ -43,16 +42,16 @@ std::string decode(std::string_view text)
     return decoded;
 }
 
-void refuseUnreadable(const fs::path &path, int error)
+void refuseUnreadable(const std::string &path, int error)
 {
     if (error != 0 && error != ENOENT && error != ENOTDIR)
     {
-        raiseSystemError(error, "could not read '" + path.string() + "'");
+        raiseSystemError(error, "could not read '" + path + "'");
     }
 }
 
 /// Returns the first line; empty if there is no such file.
-std::string readFirstLine(const fs::path &path)
+std::string readFirstLine(const std::string &path)
 {
     errno = 0;
     std::ifstream file(path);
@@ -63,18 +62,23 @@ std::string readFirstLine(const fs::path &path)
 }
 
 /// Returns the reference that a HEAD names, or any other line as it is.
-std::string readReference(const fs::path &path)
+std::string readReference(const std::string &path)
 {
     constexpr std::string_view link = "ref: ";
     const std::string line = readFirstLine(path);
     return isIn(link, line) ? line.substr(link.size()) : line;
 }
 
-fs::path repositoryAt(const std::string &path)
+/// Returns 0, or why the path cannot be examined.
+int examine(const std::string &path)
 {
-    std::error_code error;
-    const fs::path inside = fs::path(path) / ".git";
-    return fs::exists(inside, error) ? inside : fs::path(path);
+    return ::access(path.c_str(), F_OK) == 0 ? 0 : errno;
+}
+
+std::string repositoryAt(const std::string &path)
+{
+    const std::string inside = path + "/.git";
+    return examine(inside) == 0 ? inside : path;
 }
 
 } // namespace
@@ -95,27 +99,31 @@ std::optional<std::string> findRemotePath(const std::string &address)
 
 std::set<std::string> findCheckedOut(const std::string &path)
 {
+    const std::string trees = repositoryAt(path) + "/worktrees";
+    const int error = examine(trees);
+    refuseUnreadable(trees, error);
     std::set<std::string> branches;
-    std::error_code error;
-    const fs::path trees = repositoryAt(path) / "worktrees";
-    auto entry = fs::directory_iterator(trees, error);
-    for (; !error && entry != fs::directory_iterator(); entry.increment(error))
+    const auto addBranches = [&](const std::string &tree)
     {
         for (const char *const file :
-             {"HEAD", "rebase-merge/head-name", "rebase-apply/head-name", "BISECT_START"})
+             {"/HEAD", "/rebase-merge/head-name", "/rebase-apply/head-name", "/BISECT_START"})
         {
-            const std::string name = readReference(entry->path() / file);
+            const std::string name = readReference(trees + '/' + tree + file);
             // A bisection has the short name.
             branches.insert(isIn(branchesFolder, name) ? name : std::string(branchesFolder) + name);
         }
+        return true;
+    };
+    if (error == 0 && !visitFolder(trees, addBranches))
+    {
+        refuseUnreadable(trees, errno != 0 ? errno : EIO);
     }
-    refuseUnreadable(trees, error.value());
     return branches;
 }
 
 std::string findCurrent(const std::string &path)
 {
-    return readReference(repositoryAt(path) / "HEAD");
+    return readReference(repositoryAt(path) + "/HEAD");
 }
 
 } // namespace vclink::git

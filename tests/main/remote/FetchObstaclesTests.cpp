@@ -92,7 +92,7 @@ class FetchObstacles : public RemoteFixture
         tag.push_back(name);
         author_.git(tag);
         author_.git({"push", "--quiet", "--force", "server", name});
-        tag.push_back("copy");
+        tag.emplace_back("copy");
         repository_.git(tag);
     }
 };
