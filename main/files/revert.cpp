@@ -93,12 +93,12 @@ void resetToHead(git_repository *repository, const git_object *head, const Paths
     raise(shared_vclink::git::Conflicted(vclink::util::generateFileReport(std::move(files))));
 }
 
-/// Throws if one of the listed files is in conflict.
-void refuseConflicts(git_index *index, const PathspecArray &pathspec, const upath &root)
+/// Returns the listed files that are in conflict.
+std::vector<upath> findConflicts(git_index *index, const PathspecArray &pathspec, const upath &root)
 {
     if (git_index_has_conflicts(index) == 0)
     {
-        return;
+        return {};
     }
     const ListedFiles listed(index, pathspec.array());
     std::set<upath> conflicted;
@@ -112,18 +112,12 @@ void refuseConflicts(git_index *index, const PathspecArray &pathspec, const upat
             conflicted.insert(joinRepositoryPath(root, entry->path, buffer));
         }
     }
-    if (!conflicted.empty())
-    {
-        raiseConflicted({conflicted.begin(), conflicted.end()});
-    }
+    return {conflicted.begin(), conflicted.end()};
 }
 
 void resetEntries(git_repository *repository, git_index *index, const git_object *head,
                   const PathspecArray &pathspec, const FileStateMap &states, const upath &root)
 {
-    // Another process may have staged a conflict since the states were read, or libgit2 may not
-    // have been able to read them.
-    refuseConflicts(index, pathspec, root);
     const std::vector<std::string> names = changedNames(states, root);
     resetToHead(repository, head, pathspec, names.size());
     // If a file became a link in the index, or a link a file, the first reset removes it from the
@@ -174,6 +168,13 @@ void GitAdapter::revertFiles(const std::vector<upath> &files)
     // cannot read the index file, and would then have only these entries.
     const OwnedHandle<git_index> index = getRepositoryIndex(repository.get());
     refuseOtherCase(index.get(), pathspec.array());
+    // Another process may have brought a file into conflict since the states were read. Without
+    // states, because they could not be read, none was in conflict.
+    std::vector<upath> conflicted = findConflicts(index.get(), pathspec, root_);
+    if (!conflicted.empty() && throwIfConflicted(files).empty())
+    {
+        raiseConflicted(std::move(conflicted));
+    }
     resetEntries(repository.get(), index.get(), head.has_value() ? head.value().get() : nullptr,
                  pathspec, states, root_);
     const std::shared_ptr<GitOptionsFactory> factory = optionsFactory_;

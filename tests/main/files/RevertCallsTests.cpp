@@ -233,7 +233,7 @@ TEST_F(RevertCalls, RefuseAConflictOfAnotherProcessAfterTheQuery)
                 beginMerge({"conflicted"});
         });
     EXPECT_THROW(revert({"file", "conflicted"}), TagException<Conflicted>);
-    EXPECT_EQ(opened, 2);
+    EXPECT_EQ(opened, 3);
     EXPECT_EQ(repository_.git({"diff", "--name-only", "--diff-filter=U"}), "conflicted\n");
     EXPECT_THAT(repository_.read("conflicted"), testing::HasSubstr("<<<<<<<"));
     EXPECT_THAT(calls_.openHandles(), IsEmpty());
