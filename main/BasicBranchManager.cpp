@@ -19,7 +19,7 @@
 #include "main/checkout/CheckoutWatch.hpp"
 #include "main/merge/BranchMerger.hpp"
 #include "main/mergeState/unfinishedOperation.hpp"
-#include "main/mergeState/workingTrees.hpp"
+#include "util/repository/workingTrees.hpp"
 #include "options/gitRecords.hpp"
 #include "util/lock/BranchSettings.hpp"
 #include "util/lock/IndexLock.hpp"

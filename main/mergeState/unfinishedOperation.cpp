@@ -10,7 +10,7 @@
 
 #include "error/errorUtil/GitResult.hpp"
 #include "error/errorUtil/raiseGitError.hpp"
-#include "main/mergeState/workingTrees.hpp"
+#include "util/repository/workingTrees.hpp"
 #include "util/repository/repository.hpp"
 
 namespace vclink::git

@@ -3,17 +3,17 @@
 
 #include <algorithm>
 #include <array>
+#include <cerrno>
 #include <iterator>
 #include <optional>
-#include <set>
 #include <string>
-#include <utility>
 
 #include <git2/config.h>
 #include <git2/errors.h>
 #include <git2/remote.h>
 #include <git2/repository.h>
 #include <strings.h>
+#include <unistd.h>
 
 #include "error/errorUtil/GitResult.hpp"
 #include "error/errorUtil/raiseGitError.hpp"
@@ -21,6 +21,7 @@
 #include "main/remote/remotePath.hpp"
 #include "util/repository/objectIds.hpp"
 #include "util/repository/repository.hpp"
+#include "util/repository/workingTrees.hpp"
 
 namespace vclink::git
 {
@@ -69,12 +70,24 @@ bool permits(git_config *config, const char *setting)
                        { return ::strcasecmp(value, permission) == 0; });
 }
 
+/// Returns false only if the path certainly does not exist.
+bool mayExist(const std::string &path)
+{
+    return ::access(path.c_str(), F_OK) == 0 || (errno != ENOENT && errno != ENOTDIR);
+}
+
+bool mayHaveWorkingTrees(const std::string &path)
+{
+    return mayExist(path + "/worktrees") || mayExist(path + "/.git");
+}
+
 /// The repository of a remote on this machine.
 class Receiver
 {
   public:
-    Receiver(std::string path, std::set<std::string> checkedOut)
-        : path_(std::move(path)), checkedOut_(std::move(checkedOut)), repository_(openAt(path_)),
+    explicit Receiver(const std::string &path)
+        : repository_(openAt(path)),
+          trees_(findLinkedWorkingTrees(git_repository_commondir(repository_.get()))),
           config_(acquire<git_config>(git_repository_config_snapshot, repository_.get()).value())
     {
     }
@@ -86,7 +99,7 @@ class Receiver
 
     void refuseCheckedOut(const std::string &branch) const
     {
-        if (checkedOut_.count(branch) != 0 && !permits(config_.get(), "receive.denyCurrentBranch"))
+        if (isUsed(branch) && !permits(config_.get(), "receive.denyCurrentBranch"))
         {
             raiseRejected(
                 "'" + branch +
@@ -103,7 +116,8 @@ class Receiver
                           "' cannot be deleted at the remote, because receive.denyDeletes is set "
                           "there");
         }
-        const bool isCurrent = checkedOut_.count(branch) != 0 || findCurrent(path_) == branch;
+        const WorkingTree own(git_repository_path(repository_.get()));
+        const bool isCurrent = isUsed(branch) || own.isOn(branch);
         if (isCurrent && !permits(config_.get(), "receive.denyDeleteCurrent"))
         {
             raiseRejected("'" + branch +
@@ -118,9 +132,15 @@ class Receiver
     }
 
   private:
-    std::string path_;
-    std::set<std::string> checkedOut_;
+    bool isUsed(const std::string &branch) const
+    {
+        return std::any_of(trees_.begin(), trees_.end(),
+                           [&branch](const WorkingTree &tree)
+                           { return tree.isOn(branch) || tree.returnsTo(branch); });
+    }
+
     OwnedHandle<git_repository> repository_;
+    std::vector<WorkingTree> trees_;
     OwnedHandle<git_config> config_;
 };
 
@@ -163,20 +183,19 @@ void refuseRejectedPush(git_repository *repository, const git_remote *remote,
     {
         return;
     }
-    const std::set<std::string> checkedOut = findCheckedOut(*path);
+    const bool hasTrees = mayHaveWorkingTrees(*path);
     std::vector<Refspec> suspects;
     std::copy_if(refspecs.begin(), refspecs.end(), std::back_inserter(suspects),
-                 [&checkedOut](const Refspec &refspec)
+                 [hasTrees](const Refspec &refspec)
                  {
                      return isIn(branchesFolder, refspec.target) &&
-                            (refspec.isForced || refspec.source.empty() ||
-                             checkedOut.count(refspec.target) != 0);
+                            (hasTrees || refspec.isForced || refspec.source.empty());
                  });
     if (suspects.empty())
     {
         return;
     }
-    const Receiver receiver(*path, checkedOut);
+    const Receiver receiver(*path);
     for (const Refspec &refspec : suspects)
     {
         refuseRejected(receiver, repository, refspec);

@@ -51,7 +51,7 @@ const std::vector<Room> &rooms()
         {"main/checkout", {"main/mergeState"}},
         {"main/files", {"main/checkout", "main/mergeState"}},
         {"main/merge", {"main/checkout", "main/files", "main/mergeState"}},
-        {"main/remote", {"main/checkout", "main/files"}},
+        {"main/remote", {"main/files"}},
         {"main", {"main/checkout", "main/files", "main/merge", "main/mergeState", "main/remote"}}};
     return table;
 }

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-#include "main/mergeState/workingTrees.hpp"
+#include "util/repository/workingTrees.hpp"
 
 #include <algorithm>
 #include <array>
@@ -111,15 +111,34 @@ std::vector<std::string> foldersIn(const std::string &path)
     return folders;
 }
 
+/// @param own the folder of the one to leave out
+std::vector<WorkingTree> findLinkedBut(const std::string &own, const std::string &shared)
+{
+    std::vector<WorkingTree> trees;
+    for (const std::string &state : foldersIn(shared + "worktrees/"))
+    {
+        if (!isSameFolder(state, own) && isLinked(state))
+        {
+            trees.emplace_back(state);
+        }
+    }
+    return trees;
+}
+
 } // namespace
 
 WorkingTree::WorkingTree(std::string state) : state_(std::move(state))
 {
 }
 
+bool WorkingTree::isOn(const std::string &branch) const
+{
+    return referenceIn(firstLineOf(state_ + "HEAD")) == branch;
+}
+
 bool WorkingTree::isLinkedTo(const std::string &branch) const
 {
-    return isLinked(state_) && referenceIn(firstLineOf(state_ + "HEAD")) == branch;
+    return isLinked(state_) && isOn(branch);
 }
 
 bool WorkingTree::returnsTo(const std::string &branch) const
@@ -151,21 +170,19 @@ bool WorkingTree::moves(const std::string &branch) const
     return false;
 }
 
+std::vector<WorkingTree> findLinkedWorkingTrees(const std::string &shared)
+{
+    return findLinkedBut(std::string(), shared);
+}
+
 std::vector<WorkingTree> findOtherWorkingTrees(git_repository *repository)
 {
     const std::string own = git_repository_path(repository);
     const std::string shared = git_repository_commondir(repository);
-    std::vector<WorkingTree> trees;
+    std::vector<WorkingTree> trees = findLinkedBut(own, shared);
     if (!isSameFolder(shared, own))
     {
         trees.emplace_back(shared);
-    }
-    for (const std::string &state : foldersIn(shared + "worktrees/"))
-    {
-        if (!isSameFolder(state, own) && isLinked(state))
-        {
-            trees.emplace_back(state);
-        }
     }
     return trees;
 }

@@ -19,6 +19,8 @@ class WorkingTree
     /// @param state the folder with the working tree's HEAD
     explicit WorkingTree(std::string state);
 
+    /// Returns true if HEAD names the branch. That of a bare repository does as well.
+    bool isOn(const std::string &branch) const;
     /// Returns true for a linked working tree that has the branch checked out.
     bool isLinkedTo(const std::string &branch) const;
     /// Returns true if a rebase or bisection returns to the branch in the end.
@@ -29,6 +31,11 @@ class WorkingTree
   private:
     std::string state_;
 };
+
+/// Returns the linked working trees of a repository, as findOtherWorkingTrees() does.
+/// @param shared the folder of the repository, with a slash at its end
+/// @throws LibGit2Exception if they cannot be listed
+std::vector<WorkingTree> findLinkedWorkingTrees(const std::string &shared);
 
 /// Returns all other working trees of the repository, as git lists them: libgit2 leaves out the
 /// ones whose folders are gone, for example because they are on another disk.

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-#include "main/mergeState/workingTrees.hpp"
+#include "util/repository/workingTrees.hpp"
 
 #include <functional>
 #include <ostream>
