@@ -19,7 +19,6 @@
 #include "main/checkout/CheckoutWatch.hpp"
 #include "main/merge/BranchMerger.hpp"
 #include "main/mergeState/unfinishedOperation.hpp"
-#include "util/repository/workingTrees.hpp"
 #include "options/gitRecords.hpp"
 #include "util/lock/BranchSettings.hpp"
 #include "util/lock/IndexLock.hpp"
@@ -28,6 +27,7 @@
 #include "util/repository/objectIds.hpp"
 #include "util/repository/reflogAccess.hpp"
 #include "util/repository/repository.hpp"
+#include "util/repository/workingTrees.hpp"
 
 namespace vclink::git
 {

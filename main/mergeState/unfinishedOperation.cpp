@@ -10,8 +10,8 @@
 
 #include "error/errorUtil/GitResult.hpp"
 #include "error/errorUtil/raiseGitError.hpp"
-#include "util/repository/workingTrees.hpp"
 #include "util/repository/repository.hpp"
+#include "util/repository/workingTrees.hpp"
 
 namespace vclink::git
 {
