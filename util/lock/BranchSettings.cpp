@@ -155,13 +155,29 @@ bool hasSettingBesideHeader(const std::string &line)
     return next != line.end() && *next != '#' && *next != ';';
 }
 
+/// Returns true if the value in this line goes on in the next one.
+bool goesOn(const std::string &line)
+{
+    const auto first = std::find_if_not(line.begin(), line.end(), isSpace);
+    if (first == line.end() || *first == '#' || *first == ';')
+    {
+        return false;
+    }
+    const auto end = line.rbegin() + (line.back() == '\r' ? 1 : 0);
+    const auto other =
+        std::find_if_not(end, line.rend(), [](char letter) { return letter == '\\'; });
+    return (other - end) % 2 != 0;
+}
+
 /// libgit2 would write such a setting twice, or keep the one that is to be removed.
 void refuseSettingsBesideHeadersIn(const std::string &path)
 {
     std::ifstream file(path);
-    for (std::string line; std::getline(file, line);)
+    bool isContinued = false;
+    for (std::string line; std::getline(file, line); isContinued = goesOn(line))
     {
-        if (hasSettingBesideHeader(line))
+        // A value can go on with a line that begins like a header.
+        if (!isContinued && hasSettingBesideHeader(line))
         {
             raiseGitError(GIT_ERROR, GIT_ERROR_CONFIG,
                           "'" + path + "' has a setting in the line of the header '" +

@@ -283,10 +283,18 @@ TEST_F(DeleteBranch, FailsIfASettingIsInTheLineOfAHeader)
     repository_.write(".git/config", before + "[remote \"o\"] url = u\n");
     drop("topic");
     EXPECT_EQ(repository_.read(".git/config"), before + "[remote \"o\"] url = u\n");
-    repository_.git({"branch", "topic"});
-    repository_.write(".git/config", before + "[branch \"topic\"] # mine\n\tremote = o\n");
-    drop("topic");
-    EXPECT_FALSE(repository_.tryGit({"config", "branch.topic.remote"}).succeeded());
+    // The second of them is a part of a value, which begins like a header.
+    for (const std::string line : {"[branch \"topic\"] # mine \\\n\tremote = o\n",
+                                   "[branch \"topic\"]\n\tremote = o\n[alias]\n\tup = \"!f() { "
+                                   "\\\n[ -n x ] && git status; \\\n}; f\"\n"})
+    {
+        repository_.git({"branch", "topic"});
+        repository_.write(".git/config", before + line);
+        const auto alias = repository_.tryGit({"config", "alias.up"}).output;
+        drop("topic");
+        EXPECT_FALSE(repository_.tryGit({"config", "branch.topic.remote"}).succeeded());
+        EXPECT_EQ(repository_.tryGit({"config", "alias.up"}).output, alias);
+    }
 }
 
 TEST_F(DeleteBranch, NeedsNoConfiguration)
