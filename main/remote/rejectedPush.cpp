@@ -56,8 +56,9 @@ bool isSet(git_config *config, const char *setting)
 /// Returns true if a setting such as receive.denyCurrentBranch permits what git denies by default.
 bool permits(git_config *config, const char *setting)
 {
-    static constexpr std::array<const char *, 7> permissions{"ignore", "warn", "false", "no",
-                                                             "off",    "0",    ""};
+    // An empty text can also be a setting without a value, which means yes.
+    static constexpr std::array<const char *, 6> permissions{"ignore", "warn", "false",
+                                                             "no",     "off",  "0"};
     const char *value = nullptr;
     const GitResult<void> found = call(git_config_get_string, &value, config, setting);
     if (found.has_error() && found.error().getCode() == GIT_ENOTFOUND)

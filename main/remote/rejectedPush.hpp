@@ -19,8 +19,8 @@ namespace vclink::git
 ///   the deletion of the current branch, unless receive.denyCurrentBranch or
 ///   receive.denyDeleteCurrent allow it.
 ///
-/// Opens the remote's repository only if a refspec deletes or begins with '+', or the branch is
-/// checked out. git_repository_open_ext, git_config_get_bool, git_config_get_string.
+/// Opens the remote's repository only if a refspec deletes or begins with '+', or if it may have
+/// linked working trees. git_repository_open_ext, git_config_get_bool, git_config_get_string.
 /// @param remote its address is the one that is pushed to
 /// @throws LibGit2Exception that names the branch, or if a call fails
 void refuseRejectedPush(git_repository *repository, const git_remote *remote,

@@ -126,6 +126,10 @@ TEST_P(PushObstacles, FollowTheSettingsOfARepositoryOnThisMachine)
         expectAsGitDoes(refspecs, words);
         kept.copyTo(server_.path());
     }
+    const std::string settings = server_.read("config");
+    server_.write("config", settings + "[receive]\n\tdenyDeleteCurrent\n");
+    expectAsGitDoes({":refs/heads/main"}, "current branch");
+    server_.write("config", settings);
     server_.git({"config", "receive.denyDeleteCurrent", "ignore"});
     expectAsGitDoes({":refs/heads/main"}, "");
 }
