@@ -6,6 +6,7 @@
 #include <system_error>
 
 #include "failures.hpp"
+#include "gitProgram.hpp"
 #include "names.hpp"
 #include "texts.hpp"
 #include "workingCopy.hpp"
@@ -39,7 +40,7 @@ std::string shortName(const std::string &line)
 fs::path rootOf(const fs::path &state)
 {
     const std::string entry = readLine(state / "gitdir");
-    const fs::path place = entry.empty() ? state : fs::path(entry);
+    const fs::path place = entry.empty() ? state : (state / entry).lexically_normal();
     return place.filename() == ".git" ? place.parent_path() : fs::path();
 }
 
@@ -66,6 +67,12 @@ void take(const fs::path &state, bool isOwn, std::vector<CheckedOutBranch> &bran
     }
 }
 
+/// Its HEAD checks nothing out, even if its folder is called ".git".
+bool isBare(const fs::path &state)
+{
+    return runGit(state, {"rev-parse", "--is-bare-repository"}) == "true\n";
+}
+
 } // namespace
 
 std::vector<CheckedOutBranch> findCheckedOutBranches(const fs::path &root)
@@ -73,7 +80,11 @@ std::vector<CheckedOutBranch> findCheckedOutBranches(const fs::path &root)
     std::error_code ignored;
     const fs::path own = fs::weakly_canonical(stateFolder(root), ignored);
     const fs::path shared = fs::weakly_canonical(sharedFolder(own), ignored);
-    std::vector<fs::path> states{shared};
+    std::vector<fs::path> states;
+    if (!isBare(shared))
+    {
+        states.push_back(shared);
+    }
     for (const auto &entry : fs::directory_iterator(shared / "worktrees", ignored))
     {
         states.push_back(entry.path());

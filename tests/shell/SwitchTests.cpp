@@ -121,6 +121,15 @@ TEST_F(ShellSwitch, NamesTheWorkingCopyThatHasTheBranch)
     succeed({"switch", "other"});
 }
 
+TEST_F(ShellSwitch, TakesTheBranchOfABareRepository)
+{
+    const std::string bare = (folder() / "bare/.git").string();
+    const std::string linked = (folder() / "linked").string();
+    repository_.git({"clone", "--quiet", "--bare", ".", bare});
+    repository_.git({"--git-dir", bare, "worktree", "add", "--quiet", "-b", "mine", linked});
+    EXPECT_EQ(runIn(linked, {"switch", "main"}).exitStatus, 0);
+}
+
 TEST_F(ShellSwitch, GoesBackToThePreviousBranch)
 {
     succeed({"switch", "other"});
