@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: MIT
 #include "main/files/otherCase.hpp"
+#include "support/text.hpp"
 
 #include <functional>
 #include <string>

@@ -7,6 +7,7 @@
 #include <gtest/gtest.h>
 
 #include "InterruptedMergeFixture.hpp"
+#include "support/text.hpp"
 
 namespace
 {
