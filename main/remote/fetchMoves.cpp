@@ -9,9 +9,8 @@
 #include <string_view>
 #include <utility>
 
-#include <git2/repository.h>
-
 #include "util/repository/objectIds.hpp"
+#include "util/repository/repository.hpp"
 
 namespace vclink::git
 {
@@ -132,10 +131,7 @@ FetchSettings readFetchSettings(git_repository *repository, const git_remote *re
     settings.tags = options.download_tags != GIT_REMOTE_DOWNLOAD_TAGS_UNSPECIFIED
                         ? options.download_tags
                         : git_remote_autotag(remote);
-    // If it cannot be found out, it may be.
-    settings.isShallow =
-        std::any_of(settings.active.begin(), settings.active.end(), canMoveBranch) &&
-        git_repository_is_shallow(repository) != 0;
+    settings.isShallow = isShallow(repository);
     return settings;
 }
 

@@ -21,7 +21,6 @@ struct FetchSettings
     /// the configured refspecs if others are given: they apply to what these fetch
     std::vector<Refspec> passive;
     git_remote_autotag_option_t tags = GIT_REMOTE_DOWNLOAD_TAGS_AUTO;
-    /// false if that makes no difference
     bool isShallow = false;
 };
 

@@ -6,13 +6,16 @@
 #include <string>
 #include <vector>
 
+#include <git2/deprecated.h> // LIBGIT2_VER_MAJOR, of which 1.8 has made another name
 #include <git2/errors.h>
+#include <git2/version.h>
 
 #include "error/errorUtil/GitResult.hpp"
 #include "error/errorUtil/raiseGitError.hpp"
 #include "main/remote/Refspec.hpp"
 #include "main/remote/fetchMoves.hpp"
 #include "main/remote/lookAhead.hpp"
+#include "main/remote/remotePath.hpp"
 #include "util/path/PathspecArray.hpp"
 #include "util/repository/objectIds.hpp"
 
@@ -20,6 +23,24 @@ namespace vclink::git
 {
 namespace
 {
+
+/// The transport for repositories on this machine does not know where the history of a shallow
+/// repository ends, and the download writes that down: .git/shallow is gone after it. The releases
+/// before 1.9 lose it with each transport.
+constexpr bool losesEndOfHistory = LIBGIT2_VER_MAJOR > 1 ||
+                                   (LIBGIT2_VER_MAJOR == 1 && LIBGIT2_VER_MINOR >= 7);
+constexpr bool losesItOverNetwork = LIBGIT2_VER_MAJOR == 1 && LIBGIT2_VER_MINOR < 9;
+
+void refuseLossOfShallow(const git_remote *remote)
+{
+    const char *const address = git_remote_url(remote);
+    if (losesItOverNetwork || (address != nullptr && findRemotePath(address)))
+    {
+        raiseGitError(GIT_ERROR, GIT_ERROR_REPOSITORY,
+                      "this repository lacks the older part of its history, and libgit2 would "
+                      "remove the note of where it begins: use 'git fetch'");
+    }
+}
 
 bool isPruned(const git_remote *remote, const git_fetch_options &options)
 {
@@ -118,6 +139,10 @@ void refuseFetchThatLoses(git_repository *repository, git_remote *remote,
                           const PathspecArray &refspecs, const git_fetch_options &options)
 {
     const FetchSettings settings = readFetchSettings(repository, remote, refspecs.array(), options);
+    if (losesEndOfHistory && settings.isShallow)
+    {
+        refuseLossOfShallow(remote);
+    }
     const std::vector<Refspec> prunable =
         findPrunable(repository, remote, settings.active, options);
     const bool mayMove = mayMoveUnguarded(settings);

@@ -14,6 +14,8 @@ namespace vclink::git
 /// - Pruning would delete the target of a refspec without "*", because the remote lacks the source.
 /// - A tag would be replaced without a '+'.
 /// - A branch would lose commits without a '+', because libgit2 cannot compare them or does not.
+/// - The repository is shallow, and the download would remove .git/shallow: then git reports the
+///   repository as broken, and libgit2 takes commits from branches.
 ///
 /// Asks the remote only if refspecs and settings allow one of these; the fetch on the same handle
 /// then uses the connection. Downloads the commits of a branch to compare them.

@@ -160,9 +160,8 @@ std::vector<Tolerance> tolerancesOfMerges(const std::string &operation, const st
 std::vector<Tolerance> tolerancesOfRemotes(const std::string &normal)
 {
     return {
-        // It prunes then, and is shallow, for all one knows. So it does and is.
+        // It prunes then, for all one knows. So it does.
         {"fetchGuarded", "git_remote_prune_refs", any, any, normal},
-        {"fetchGuarded", "git_repository_is_shallow", any, any, normal},
         // What is not there can't be lost.
         {"fetchGuarded", "git_reference_name_to_id", any, GIT_ENOTFOUND, normal},
         {"pushGuarded", "git_reference_name_to_id", any, GIT_ENOTFOUND, normal},

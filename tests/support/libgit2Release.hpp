@@ -65,6 +65,16 @@ constexpr std::string_view endOfSshTries =
 /// until the server has had enough.
 constexpr bool tellsOfMissingAgent = !isSince(1, 9);
 
+/// The failure of a fetch into a shallow repository, 0 if there is none. Earlier releases look for
+/// the missing commits before they ask a server for new ones; later ones would lose .git/shallow
+/// over a path, which the library refuses.
+constexpr int failureOfShallowFetch(bool isByPath)
+{
+    if (isByPath)
+        return isSince(1, 7) ? GIT_ERROR : GIT_OK;
+    return isSince(1, 9) ? GIT_OK : isSince(1, 7) ? GIT_ERROR : GIT_ENOTFOUND;
+}
+
 /// Whether libgit2 reports no failure: then there is no record, or one that says so.
 inline bool isSilent()
 {

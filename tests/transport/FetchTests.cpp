@@ -1,10 +1,12 @@
 // SPDX-License-Identifier: MIT
 #include <string>
+#include <string_view>
 
 #include <git2/errors.h>
 #include <gtest/gtest.h>
 
 #include "TransportFixture.hpp"
+#include "support/libgit2Release.hpp"
 
 namespace
 {
@@ -13,6 +15,7 @@ using vclink::test::allTransports;
 using vclink::test::failureOf;
 using vclink::test::GitRepository;
 using vclink::test::referencesOf;
+using vclink::test::Transport;
 
 /// Two clones of one repository: what the library fetches into the one is what git fetches into the
 /// other.
@@ -151,6 +154,37 @@ TEST_P(Fetch, MovesABranchBesideOnlyForward)
     fetchInto("copy");
     EXPECT_EQ(fetchedId("refs/heads/copy"), id);
     expectSound(fetched_);
+}
+
+TEST_P(Fetch, KeepsAShallowRepositorySound)
+{
+    constexpr std::string_view into = "refs/heads/main:refs/heads/";
+    const bool isByPath = GetParam() == Transport::Path || GetParam() == Transport::File;
+    const int failure = vclink::test::libgit2_release::failureOfShallowFetch(isByPath);
+    const std::string old = change("file", "second\n");
+    publish({"main", ":deleted"});
+    GitRepository shallow = makeRepository("shallow");
+    shallow.git({"remote", "add", "origin", url_});
+    shallow.git({"fetch", "--quiet", "--depth=1", "origin", "main"});
+    shallow.git({"checkout", "--quiet", "-b", "own", "FETCH_HEAD"});
+    shallow.write("own", "x");
+    shallow.commitAll("own");
+    shallow.git({"checkout", "--quiet", "--detach"});
+    const std::string id = change("file", "third\n");
+    publish({"main"});
+    const std::string before = referencesOf(shallow);
+    const std::string beginning = shallow.read(".git/shallow");
+
+    EXPECT_EQ(failureOf([&] { fetch(shallow, {std::string(into) + "own"}); }).code,
+              failure != GIT_OK ? failure : int{GIT_ENONFASTFORWARD});
+    EXPECT_EQ(referencesOf(shallow), before);
+    if (failure == GIT_OK)
+        fetch(shallow);
+    else
+        EXPECT_EQ(failureOf([&] { fetch(shallow); }).code, failure);
+    EXPECT_EQ(shallow.line({"rev-parse", "origin/main"}), failure != GIT_OK ? old : id);
+    EXPECT_EQ(shallow.read(".git/shallow"), beginning);
+    expectSound(shallow);
 }
 
 TEST_P(Fetch, TakesAThousandCommits)

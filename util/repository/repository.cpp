@@ -36,9 +36,8 @@ void readAgainIfEmpty(git_index *index)
 }
 
 /// libgit2 treats an unreadable file as a missing one.
-bool hasMergeHead(git_repository *repository)
+bool isThere(const std::string &path)
 {
-    const std::string path = git_repository_path(repository) + std::string("MERGE_HEAD");
     struct stat status = {};
     if (::stat(path.c_str(), &status) == 0)
     {
@@ -49,6 +48,11 @@ bool hasMergeHead(git_repository *repository)
         raiseSystemError(errno, "could not read '" + path + "'");
     }
     return false;
+}
+
+bool hasMergeHead(git_repository *repository)
+{
+    return isThere(git_repository_path(repository) + std::string("MERGE_HEAD"));
 }
 
 } // namespace
@@ -91,6 +95,11 @@ void cleanUpRepositoryState(git_repository *repository)
     {
         check(git_repository_state_cleanup, repository);
     }
+}
+
+bool isShallow(git_repository *repository)
+{
+    return isThere(git_repository_commondir(repository) + std::string("shallow"));
 }
 
 OwnedHandle<git_index> getRepositoryIndex(git_repository *repository)

@@ -30,6 +30,11 @@ int readRepositoryState(git_repository *repository);
 /// Calls git_repository_state_cleanup, and again if MERGE_HEAD still exists.
 void cleanUpRepositoryState(git_repository *repository);
 
+/// Returns true if the repository lacks the older part of its history. git_repository_is_shallow
+/// does not see it in a linked working tree. Throws if the list of the oldest commits cannot be
+/// examined.
+bool isShallow(git_repository *repository);
+
 /// Returns the repository's index. git_repository_index, and for an empty index git_index_read, to
 /// be sure.
 [[nodiscard]] OwnedHandle<git_index> getRepositoryIndex(git_repository *repository);

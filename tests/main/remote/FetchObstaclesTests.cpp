@@ -8,6 +8,8 @@
 #include <gtest/gtest.h>
 
 #include "RemoteFixture.hpp"
+#include "support/libgit2Release.hpp"
+#include "support/text.hpp"
 
 extern "C" __attribute__((weak)) void disableLeakChecks() __asm__("__lsan_disable");
 extern "C" __attribute__((weak)) void enableLeakChecks() __asm__("__lsan_enable");
@@ -36,6 +38,7 @@ class WithoutLeakChecks
 using testing::HasSubstr;
 using namespace vclink::test;
 using Refspecs = std::vector<std::string>;
+constexpr int shallowFailure = libgit2_release::failureOfShallowFetch(true);
 
 /// The branch "copy" is where the server's "main" was, and "own" has a commit of its own on top.
 /// Nothing is checked out.
@@ -64,13 +67,19 @@ class FetchObstacles : public RemoteFixture
 
     void expectRefusedAsByGit(const Refspecs &refspecs, int code, const std::string &name) const
     {
-        SCOPED_TRACE(testing::PrintToString(refspecs));
         EXPECT_FALSE(fetchWithGit(twin(), refspecs).succeeded());
+        expectRefused(refspecs, code, GIT_ERROR_REFERENCE, '\'' + name + '\'');
+    }
+
+    void expectRefused(const Refspecs &refspecs, int code, int errorClass,
+                       const std::string &words) const
+    {
+        SCOPED_TRACE(testing::PrintToString(refspecs));
         const auto before = references(repository_);
         const auto failure = failureOf([&] { fetch(refspecs); });
         EXPECT_EQ(failure.code, code);
-        EXPECT_EQ(failure.errorClass, GIT_ERROR_REFERENCE);
-        EXPECT_THAT(failure.text, HasSubstr('\'' + name + '\''));
+        EXPECT_EQ(failure.errorClass, errorClass);
+        EXPECT_THAT(failure.text, HasSubstr(words));
         EXPECT_EQ(references(repository_), before);
     }
 
@@ -175,6 +184,12 @@ TEST_F(FetchObstacles, KeepCommitsInAShallowRepository)
     publish("file", "once more\n");
     start({"--depth=1"});
     const std::string own = "refs/heads/main:refs/heads/own";
+    if (shallowFailure != GIT_OK)
+    {
+        for (const auto &refspec : {own, '+' + own})
+            expectRefused({refspec}, shallowFailure, GIT_ERROR_REPOSITORY, "'git fetch'");
+        return;
+    }
     expectRefusedAsByGit({own}, GIT_ENONFASTFORWARD, "refs/heads/own");
     expectRefusedAsByGit({"main:own"}, GIT_ENONFASTFORWARD, "refs/heads/own");
     {
@@ -185,6 +200,25 @@ TEST_F(FetchObstacles, KeepCommitsInAShallowRepository)
     EXPECT_EQ(idOf("copy"), idOf("main", author_));
     expectAsGitDoes({'+' + own});
     EXPECT_EQ(idOf("own"), idOf("main", author_));
+}
+
+/// There, libgit2 does not see that the repository is shallow.
+TEST_F(FetchObstacles, KeepCommitsInALinkedWorkingTreeOfAShallowRepository)
+{
+    publish("file", "once more\n");
+    start({"--depth=1"});
+    const std::string linked = folder() / "linked";
+    repository_.git({"worktree", "add", "--quiet", "--detach", linked});
+    const auto adapter = makeAdapter(linked);
+    const auto before = references(repository_);
+    const auto fetchThere = [&adapter]
+    {
+        vclink::git::GitRemote::create("origin", *adapter)
+            ->fetch({asUtf16("refs/heads/main:refs/heads/own")});
+    };
+    EXPECT_EQ(failureOf(fetchThere).code,
+              shallowFailure != GIT_OK ? shallowFailure : int{GIT_ENONFASTFORWARD});
+    EXPECT_EQ(references(repository_), before);
 }
 
 /// libgit2 compares no commits for them.
