@@ -120,6 +120,14 @@ void makeBranches(GitRepository &repository)
     repository.git({"update-ref", "refs/remotes/origin/main", "HEAD"});
 }
 
+void makeLinkedTree(GitRepository &repository)
+{
+    makeBranches(repository);
+    const std::string linked = repository.path().parent_path() / "linked";
+    repository.git({"worktree", "add", "--quiet", "-b", "elsewhere", linked});
+    repository.git({"-C", linked, "bisect", "start"});
+}
+
 void makeSettings(GitRepository &repository)
 {
     makeBranches(repository);

@@ -32,6 +32,8 @@ void makeTypeChange(GitRepository &repository);
 void makeBranches(GitRepository &repository);
 /// Branches, with settings of "topic", one of them twice.
 void makeSettings(GitRepository &repository);
+/// Branches, and a linked working tree with a branch of its own, in a bisection.
+void makeLinkedTree(GitRepository &repository);
 /// Branches, with an untracked link in the place of "sub", which both branches have.
 void makeLinkedFolder(GitRepository &repository);
 /// Plain with "folder/deep/inside", and the branch "topic", where "folder" is a file.
