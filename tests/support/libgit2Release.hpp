@@ -57,9 +57,10 @@ inline std::string refusalOfScheme(const std::string &address)
     return isSince(1, 9) ? "invalid argument: 'port'" : address;
 }
 
-/// The text if an ssh server accepts no further keys.
-constexpr std::string_view endOfSshTries =
-    isSince(1, 9) ? "Failed getting response"
+/// A regular expression for the text if an ssh server accepts no further keys. It depends on the
+/// moment in which the server hangs up.
+constexpr const char *endOfSshTries =
+    isSince(1, 9) ? "Failed getting response|Unable to send userauth-none request"
                   : "Failed to retrieve list of SSH authentication methods";
 /// A missing ssh agent is reported at the first request for credentials. Later releases ask again
 /// until the server has had enough.

@@ -74,7 +74,7 @@ class SshCredentials : public vclink::test::ServerOfTheSuite<SshServer>,
     {
         EXPECT_EQ(failure.code, GIT_EAUTH);
         EXPECT_EQ(failure.errorClass, GIT_ERROR_SSH);
-        EXPECT_THAT(failure.text, HasSubstr(std::string(libgit2_release::endOfSshTries)));
+        EXPECT_THAT(failure.text, testing::ContainsRegex(libgit2_release::endOfSshTries));
         EXPECT_GE(requests_, 1);
         EXPECT_LE(requests_, 7);
     }
