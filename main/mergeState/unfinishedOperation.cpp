@@ -99,7 +99,7 @@ void refuseDeletionInUnfinishedOperation(git_repository *repository, const char 
     }
     for (const WorkingTree &tree : findOtherWorkingTrees(repository))
     {
-        if (tree.isLinkedTo(branch) || isNeeded(tree, branch))
+        if (tree.hasCheckedOut(branch) || isNeeded(tree, branch))
         {
             raiseUsedElsewhere("delete", branch);
         }

@@ -21,6 +21,7 @@
 #include "main/remote/remotePath.hpp"
 #include "util/repository/objectIds.hpp"
 #include "util/repository/repository.hpp"
+#include "util/repository/settings.hpp"
 #include "util/repository/workingTrees.hpp"
 
 namespace vclink::git
@@ -38,19 +39,6 @@ OwnedHandle<git_repository> openAt(const std::string &path)
     return acquire<git_repository>(git_repository_open_ext, path.c_str(),
                                    unsigned{GIT_REPOSITORY_OPEN_NO_SEARCH}, nullptr)
         .value();
-}
-
-/// Returns false if the setting does not exist.
-bool isSet(git_config *config, const char *setting)
-{
-    int value = 0;
-    const GitResult<void> found = call(git_config_get_bool, &value, config, setting);
-    if (found.has_error() && found.error().getCode() == GIT_ENOTFOUND)
-    {
-        return false;
-    }
-    check(found);
-    return value != 0;
 }
 
 /// Returns true if a setting such as receive.denyCurrentBranch permits what git denies by default.

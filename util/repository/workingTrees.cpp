@@ -9,12 +9,14 @@
 #include <utility>
 
 #include <dirent.h>
+#include <git2/config.h>
 #include <git2/errors.h>
 #include <git2/repository.h>
-#include <sys/stat.h>
 
 #include "error/errorUtil/raiseGitError.hpp"
 #include "error/errorUtil/raiseSystemError.hpp"
+#include "util/path/isSameFolder.hpp"
+#include "util/repository/settings.hpp"
 
 namespace vclink::git
 {
@@ -75,14 +77,6 @@ bool isLinked(const std::string &state)
     return !firstLineOf(state + "gitdir").empty();
 }
 
-bool isSameFolder(const std::string &one, const std::string &other)
-{
-    struct stat first = {};
-    struct stat second = {};
-    return ::stat(one.c_str(), &first) == 0 && ::stat(other.c_str(), &second) == 0 &&
-           first.st_dev == second.st_dev && first.st_ino == second.st_ino;
-}
-
 /// Returns the paths of what is in a folder, with a slash at their ends; nothing if there is no
 /// such folder.
 std::vector<std::string> foldersIn(const std::string &path)
@@ -125,9 +119,16 @@ std::vector<WorkingTree> findLinkedBut(const std::string &own, const std::string
     return trees;
 }
 
+/// Returns true if the repository has no main working tree. A handle of a linked one does not know.
+bool isBare(git_repository *repository)
+{
+    const auto config = acquire<git_config>(git_repository_config_snapshot, repository).value();
+    return isSet(config.get(), "core.bare");
+}
+
 } // namespace
 
-WorkingTree::WorkingTree(std::string state) : state_(std::move(state))
+WorkingTree::WorkingTree(std::string state, bool isBare) : state_(std::move(state)), isBare_(isBare)
 {
 }
 
@@ -136,9 +137,9 @@ bool WorkingTree::isOn(const std::string &branch) const
     return referenceIn(firstLineOf(state_ + "HEAD")) == branch;
 }
 
-bool WorkingTree::isLinkedTo(const std::string &branch) const
+bool WorkingTree::hasCheckedOut(const std::string &branch) const
 {
-    return isLinked(state_) && isOn(branch);
+    return !isBare_ && isOn(branch);
 }
 
 bool WorkingTree::returnsTo(const std::string &branch) const
@@ -182,7 +183,7 @@ std::vector<WorkingTree> findOtherWorkingTrees(git_repository *repository)
     std::vector<WorkingTree> trees = findLinkedBut(own, shared);
     if (!isSameFolder(shared, own))
     {
-        trees.emplace_back(shared);
+        trees.emplace_back(shared, isBare(repository));
     }
     return trees;
 }
@@ -192,7 +193,7 @@ bool isCheckedOutElsewhere(git_repository *repository, const std::string &branch
     const std::vector<WorkingTree> others = findOtherWorkingTrees(repository);
     return std::any_of(others.begin(), others.end(),
                        [&branch](const WorkingTree &tree)
-                       { return tree.isLinkedTo(branch) || tree.returnsTo(branch); });
+                       { return tree.hasCheckedOut(branch) || tree.returnsTo(branch); });
 }
 
 void raiseUsedElsewhere(const std::string &action, const std::string &branch)

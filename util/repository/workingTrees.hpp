@@ -17,12 +17,12 @@ class WorkingTree
 {
   public:
     /// @param state the folder with the working tree's HEAD
-    explicit WorkingTree(std::string state);
+    /// @param isBare of the repository, which has a HEAD and no working tree then
+    explicit WorkingTree(std::string state, bool isBare = false);
 
     /// Returns true if HEAD names the branch. That of a bare repository does as well.
     bool isOn(const std::string &branch) const;
-    /// Returns true for a linked working tree that has the branch checked out.
-    bool isLinkedTo(const std::string &branch) const;
+    bool hasCheckedOut(const std::string &branch) const;
     /// Returns true if a rebase or bisection returns to the branch in the end.
     bool returnsTo(const std::string &branch) const;
     /// Returns true if a rebase with `--update-refs` moves the branch in the end.
@@ -30,6 +30,7 @@ class WorkingTree
 
   private:
     std::string state_;
+    bool isBare_;
 };
 
 /// Returns the linked working trees of a repository, as findOtherWorkingTrees() does.
@@ -43,7 +44,7 @@ std::vector<WorkingTree> findLinkedWorkingTrees(const std::string &shared);
 std::vector<WorkingTree> findOtherWorkingTrees(git_repository *repository);
 
 /// Returns true if another working tree has the branch checked out, or returns to it in the end.
-/// Does not look at the HEAD of the main working tree, which libgit2 finds.
+/// libgit2 does not know if it cannot open the main working tree, for example another user's.
 /// @throws LibGit2Exception if this cannot be found out
 bool isCheckedOutElsewhere(git_repository *repository, const std::string &branch);
 

@@ -8,32 +8,12 @@
 #include <gtest/gtest.h>
 
 #include "RemoteFixture.hpp"
+#include "support/WithoutLeakChecks.hpp"
 #include "support/libgit2Release.hpp"
 #include "support/text.hpp"
 
-extern "C" __attribute__((weak)) void disableLeakChecks() __asm__("__lsan_disable");
-extern "C" __attribute__((weak)) void enableLeakChecks() __asm__("__lsan_enable");
-
 namespace
 {
-
-/// libgit2 does not release what it has of two histories if a parent is missing.
-class WithoutLeakChecks
-{
-  public:
-    WithoutLeakChecks()
-    {
-        if (disableLeakChecks != nullptr)
-            disableLeakChecks();
-    }
-    WithoutLeakChecks(const WithoutLeakChecks &) = delete;
-    WithoutLeakChecks &operator=(const WithoutLeakChecks &) = delete;
-    ~WithoutLeakChecks()
-    {
-        if (enableLeakChecks != nullptr)
-            enableLeakChecks();
-    }
-};
 
 using testing::HasSubstr;
 using namespace vclink::test;
@@ -193,6 +173,7 @@ TEST_F(FetchObstacles, KeepCommitsInAShallowRepository)
     expectRefusedAsByGit({own}, GIT_ENONFASTFORWARD, "refs/heads/own");
     expectRefusedAsByGit({"main:own"}, GIT_ENONFASTFORWARD, "refs/heads/own");
     {
+        // libgit2 does not release what it has of two histories if a parent is missing.
         const WithoutLeakChecks without;
         expectAsGitDoes({"refs/heads/main:refs/heads/copy", "refs/heads/main:refs/heads/new"});
         expectAsGitDoes({"refs/heads/main:refs/heads/copy"});
