@@ -8,7 +8,9 @@
 #include <sys/stat.h>
 
 #include "error/errorUtil/gitString.hpp"
+#include "error/errorUtil/raiseGitError.hpp"
 #include "error/errorUtil/raiseSystemError.hpp"
+#include "util/path/isSameFolder.hpp"
 
 namespace vclink::git
 {
@@ -55,6 +57,24 @@ bool hasMergeHead(git_repository *repository)
     return isThere(git_repository_path(repository) + std::string("MERGE_HEAD"));
 }
 
+/// Makes the folder the working tree. A linked working tree that was copied or moved still names
+/// its old place, and core.worktree can name any folder: files there are not the host's.
+void useWorkingTree(git_repository *repository, const std::string &folder)
+{
+    const char *const workdir = git_repository_workdir(repository);
+    if (workdir == nullptr || folder + '/' == workdir || isSameFolder(folder, workdir))
+    {
+        return;
+    }
+    if (git_repository_is_worktree(repository) == 0)
+    {
+        raiseGitError(GIT_ERROR, GIT_ERROR_REPOSITORY,
+                      "the working tree of '" + folder + "' is '" + workdir +
+                          "': open that one, or correct core.worktree");
+    }
+    check(git_repository_set_workdir, repository, folder.c_str(), 0);
+}
+
 } // namespace
 
 bool isRepository(const upath &path)
@@ -73,9 +93,12 @@ bool isRepository(const upath &path)
 OwnedHandle<git_repository> openRepository(const upath &root)
 {
     const std::string folder = toGitString(root.string());
-    return acquire<git_repository>(git_repository_open_ext, folder.c_str(),
-                                   GIT_REPOSITORY_OPEN_NO_SEARCH, nullptr)
-        .value();
+    OwnedHandle<git_repository> repository =
+        acquire<git_repository>(git_repository_open_ext, folder.c_str(),
+                                GIT_REPOSITORY_OPEN_NO_SEARCH, nullptr)
+            .value();
+    useWorkingTree(repository.get(), folder);
+    return repository;
 }
 
 int readRepositoryState(git_repository *repository)

@@ -20,7 +20,9 @@ namespace vclink::git
 /// @throws LibGit2Exception if this cannot be found out; a missing folder is not a repository
 bool isRepository(const upath &path);
 
-/// Opens the repository of exactly this folder. git_repository_open_ext.
+/// Opens the repository of exactly this folder, which is then its working tree, also if a linked
+/// working tree was moved or copied. git_repository_open_ext, git_repository_set_workdir.
+/// @throws LibGit2Exception also if the working tree is another folder (core.worktree)
 [[nodiscard]] OwnedHandle<git_repository> openRepository(const upath &root);
 
 /// Returns the operation under way, a git_repository_state_t. git_repository_state, and again if it
