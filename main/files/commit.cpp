@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: MIT
 // GitAdapter::commit: a commit of all tracked files, which also concludes a merge.
+#include <chrono>
 #include <string>
 #include <vector>
 
@@ -58,6 +59,14 @@ std::vector<OwnedHandle<git_commit>> lookupMergeHeads(git_repository *repository
     return commits;
 }
 
+/// A merge has written its index just now, and given up the lock in between: another process, such
+/// as `git status`, can hold it for a moment.
+IndexLock lockIndex(git_repository *repository, bool isMerge)
+{
+    constexpr std::chrono::seconds patience{1};
+    return isMerge ? IndexLock(repository, IndexTime::Fraction, patience) : IndexLock(repository);
+}
+
 /// Throws if the commit was not written. If libgit2 cannot write the commit's object, for example
 /// on a full disk, it reports success and moves no branch. The only signs are that the object does
 /// not exist, and the error record, which stays until the next call. Returns any other failure.
@@ -77,10 +86,8 @@ GitResult<OwnedHandle<git_object>> lookUpWritten(git_repository *repository, con
 void GitAdapter::commit(const upath & /*folder*/, const ustring &message)
 {
     const OwnedHandle<git_repository> repository = openRepository(root_);
-    // From here no other process commits, merges or ends a merge in this working copy. The index of
-    // a merge was written just now.
-    IndexLock lock(repository.get(),
-                   expectedMerge_ != nullptr ? IndexTime::Fraction : IndexTime::Second);
+    // From here no other process commits, merges or ends a merge in this working copy.
+    IndexLock lock = lockIndex(repository.get(), expectedMerge_ != nullptr);
     // If HEAD has no commit, for any reason, the new commit is a root commit.
     const GitResult<OwnedHandle<git_commit>> head = lookupCommitByName("HEAD", repository.get());
     std::vector<OwnedHandle<git_commit>> mergeHeads;

@@ -18,6 +18,7 @@
 #include "error/errorUtil/GitResult.hpp"
 #include "error/errorUtil/raiseGitError.hpp"
 #include "error/errorUtil/raiseSystemError.hpp"
+#include "util/lock/referenceLocks.hpp"
 #include "util/repository/repository.hpp"
 #include "util/scope/FileDescriptor.hpp"
 
@@ -86,17 +87,20 @@ std::string findIndex(git_repository *repository)
 class IndexLock::LockFile
 {
   public:
-    explicit LockFile(std::string path) : path_(std::move(path))
+    LockFile(std::string path, ReferenceLockWait wait) : path_(std::move(path))
     {
-        const FileDescriptor file(
-            ::open(path_.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, S_IRUSR | S_IWUSR));
-        if (!file && errno == EEXIST)
+        int error = create();
+        while (error == EEXIST && wait.pause())
+        {
+            error = create();
+        }
+        if (error == EEXIST)
         {
             raiseLocked(path_);
         }
-        if (!file)
+        if (error != 0)
         {
-            raiseSystemError(errno, "failed to create locked file '" + path_ + "'");
+            raiseSystemError(error, "failed to create locked file '" + path_ + "'");
         }
     }
     LockFile(const LockFile &) = delete;
@@ -107,6 +111,14 @@ class IndexLock::LockFile
     }
 
   private:
+    /// @return 0, or an errno
+    int create() const
+    {
+        const FileDescriptor file(
+            ::open(path_.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, S_IRUSR | S_IWUSR));
+        return file ? 0 : errno;
+    }
+
     std::string path_;
 };
 
@@ -115,8 +127,9 @@ class IndexLock::LockFile
 class IndexLock::Held
 {
   public:
-    Held(std::string index, IndexTime time)
-        : path(std::move(index)), lock(path + ".lock"), copy(path, time)
+    Held(std::string index, IndexTime time, std::chrono::milliseconds patience)
+        : path(std::move(index)), lock(path + ".lock", ReferenceLockWait(patience)),
+          copy(path, time)
     {
     }
 
@@ -125,8 +138,8 @@ class IndexLock::Held
     const IndexCopy copy;
 };
 
-IndexLock::IndexLock(git_repository *repository, IndexTime time)
-    : held_(std::make_unique<Held>(findIndex(repository), time))
+IndexLock::IndexLock(git_repository *repository, IndexTime time, std::chrono::milliseconds patience)
+    : held_(std::make_unique<Held>(findIndex(repository), time, patience))
 {
     const OwnedHandle<git_index> index = openIndex(held_->copy.path().c_str());
     check(git_repository_set_index, repository, index.get());

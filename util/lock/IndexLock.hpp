@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include <chrono>
 #include <memory>
 
 #include <git2/types.h>
@@ -15,17 +16,19 @@ namespace vclink::git
 /// it writes the file. Until then the repository works on a private copy: libgit2 writes the
 /// repository's index to it, also in a checkout or a merge.
 ///
-/// For one operation on one thread. Does not wait for the lock, as git does not.
+/// For one operation on one thread.
 class IndexLock
 {
   public:
     /// Acquires the lock, and gives the repository its copy of the index. git_index_open,
     /// git_repository_set_index, git_index_set_caps.
     /// @param repository outlives the object; must not use its index after publish()
+    /// @param patience how long to try again if something else holds the lock; git does not
     /// @throws LibGit2Exception with the code GIT_ELOCKED and the name of the lock file if
     /// something else holds the lock; then nothing has changed
-    [[nodiscard]] explicit IndexLock(git_repository *repository,
-                                     IndexTime time = IndexTime::Second);
+    [[nodiscard]] explicit IndexLock(
+        git_repository *repository, IndexTime time = IndexTime::Second,
+        std::chrono::milliseconds patience = std::chrono::milliseconds::zero());
     IndexLock(const IndexLock &) = delete;
     IndexLock &operator=(const IndexLock &) = delete;
     /// Publishes what libgit2 wrote and releases the lock, so that what was written before a

@@ -1,6 +1,10 @@
 // SPDX-License-Identifier: MIT
+#include <chrono>
+#include <functional>
+#include <future>
 #include <memory>
 #include <string>
+#include <thread>
 #include <utility>
 #include <vector>
 
@@ -8,6 +12,7 @@
 
 #include "MergeFixture.hpp"
 #include "support/text.hpp"
+#include "vclink/git/GitException.hpp"
 
 namespace
 {
@@ -22,10 +27,12 @@ class NotingAdapter : public vclink::git::GitAdapter
         EXPECT_EQ(path.string(), ustring());
         EXPECT_TRUE(path.native());
         messages.push_back(vclink::test::asUtf8(message));
+        beforeCommit();
         GitAdapter::commit(path, message);
     }
 
     std::vector<std::string> messages;
+    std::function<void()> beforeCommit = [] {};
 };
 
 /// What a merge commit says.
@@ -74,6 +81,40 @@ TEST_F(MergeCommit, IsMadeByTheAdaptersOwnOperation)
     vclink::git::BranchManager::create(adapter)->merge("topic");
     EXPECT_EQ(adapter.messages, std::vector<std::string>{"Merge branch 'topic'"});
     EXPECT_EQ(message(), "Merge branch 'topic'");
+}
+
+/// Such as `git status` of a program that has seen the new files.
+TEST_F(MergeCommit, WaitsForAnotherProcessThatHoldsTheIndexForAMoment)
+{
+    NotingAdapter adapter(vclink::test::asPath(repository_.path()),
+                          std::static_pointer_cast<vclink::ApplicationInteractor>(interactor_));
+    std::future<void> release;
+    adapter.beforeCommit = [&]
+    {
+        repository_.write(".git/index.lock", "");
+        release = std::async(std::launch::async,
+                             [this]
+                             {
+                                 std::this_thread::sleep_for(std::chrono::milliseconds(50));
+                                 repository_.remove(".git/index.lock");
+                             });
+    };
+    vclink::git::BranchManager::create(adapter)->merge("topic");
+    EXPECT_EQ(message(), "Merge branch 'topic'");
+    EXPECT_EQ(branches().getRepositoryState(), "Normal");
+}
+
+TEST_F(MergeCommit, IsLeftToTheUserIfAnotherProcessKeepsTheIndex)
+{
+    NotingAdapter adapter(vclink::test::asPath(repository_.path()),
+                          std::static_pointer_cast<vclink::ApplicationInteractor>(interactor_));
+    adapter.beforeCommit = [this] { repository_.write(".git/index.lock", ""); };
+    EXPECT_THROW(vclink::git::BranchManager::create(adapter)->merge("topic"),
+                 vclink::git::GitException);
+    repository_.remove(".git/index.lock");
+    EXPECT_EQ(branches().getRepositoryState(), "Conflicts");
+    makeAdapter(repository_.path())->commit(upath(), u"by the user");
+    EXPECT_EQ(parents().size(), 2U);
 }
 
 TEST_F(MergeCommit, IsCommittedByThePersonOfTheConfiguration)
