@@ -50,8 +50,7 @@ git_checkout_options toGitCheckoutOptions(const CheckoutOptions &options,
 git_remote_callbacks toGitRemoteCallbacks(RemoteCallbacks &callbacks);
 
 /// git_fetch_options_init. Sets the proxy record and the remote callbacks. The rest stays as
-/// libgit2 initialised it: tags are fetched with the objects that they point to, and nothing is
-/// pruned.
+/// libgit2 initialised it: tags and pruning are as configured for the remote.
 git_fetch_options toGitFetchOptions(const FetchOptions &options, GitCallbacks &callbacks);
 
 /// git_push_options_init. Sets the number of threads, the remote callbacks and the proxy record.

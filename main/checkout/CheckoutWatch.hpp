@@ -35,9 +35,9 @@ enum class CheckoutKind
 /// through a link or waits for a FIFO. libgit2 reports most files before it writes the first one;
 /// the watch examines the others before.
 ///
-/// Refuses a switch or a merge with GIT_ECONFLICT, class GIT_ERROR_CHECKOUT and a text that names
-/// the first file, before anything is written. Clears the way of a revert, as git does: replaces
-/// the links, FIFOs, sockets and devices in it.
+/// Refuses with GIT_ECONFLICT, class GIT_ERROR_CHECKOUT and a text that names the first file,
+/// before anything is written. Clears the way of a revert instead, as git does: replaces the links,
+/// FIFOs, sockets and devices in it, and refuses what it cannot clear.
 ///
 /// Also refuses a switch or a merge, with GIT_EMODIFIED, if HEAD has moved since the first look. If
 /// HEAD moves later, the checkout still compares with the HEAD that was read, so that files of the

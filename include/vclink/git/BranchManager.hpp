@@ -27,8 +27,10 @@ namespace vclink::git
 ///
 /// switchBranch and merge hold git's index lock while they work. If something else holds it,
 /// nothing is written: switchBranch throws with GIT_ELOCKED, and merge throws GitException, whose
-/// added text names the lock. If another process has locked a reference, an operation tries again
-/// for `core.filesRefLockTimeout` milliseconds: 100 by default, one minute if negative.
+/// added text names the lock. A merge gives the lock up once, after its files and index are written
+/// and before its commit, and then waits up to a second for it. If another process has locked a
+/// reference, an operation tries again for `core.filesRefLockTimeout` milliseconds: 100 by default,
+/// one minute if negative.
 class VCLINK_GIT_EXPORT BranchManager
 {
   public:
@@ -69,16 +71,18 @@ class VCLINK_GIT_EXPORT BranchManager
     /// an ignored file that the branch tracks. Keeps changes in files that are the same in both
     /// branches, and the folders of submodules, even if the branch does not have them.
     ///
-    /// Also refuses while a merge, revert, cherry-pick or rebase is under way, and if another
-    /// working tree of the repository has the branch checked out. Throws with GIT_EAMBIGUOUS if a
-    /// tag has the name of the branch and another commit, and for the branch "stash" if there is a
-    /// stash.
+    /// Also refuses while a merge, revert, cherry-pick, rebase or `git am` is under way, and, with
+    /// other codes, if another working tree of the repository has the branch checked out
+    /// (GIT_ERROR), if HEAD cannot be written (GIT_ERROR) or moves meanwhile (GIT_EMODIFIED).
+    /// Throws with GIT_EAMBIGUOUS if a tag has the name of the branch and another commit, and for
+    /// the branch "stash" if there is a stash.
     ///
     /// After a failure or a cancellation HEAD is unchanged. The files are too, unless one of them,
-    /// or HEAD itself, could not be written. git_branch_lookup, git_revparse_single,
+    /// the index, or HEAD itself, could not be written. git_branch_lookup, git_revparse_single,
     /// git_checkout_tree, git_repository_set_head.
     /// @param name the short name
     /// @throws LibGit2Exception with code GIT_ECONFLICT and class GIT_ERROR_CHECKOUT if it refuses
+    /// because of files or an operation under way
     /// @throws vclink::util::exception::CancelledOperationException
     virtual void switchBranch(const BranchName &name) = 0;
 

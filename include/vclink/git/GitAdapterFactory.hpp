@@ -94,11 +94,14 @@ namespace vclink::git
 /// what is in the place of a listed file: a folder with all its content, a symbolic link, a FIFO, a
 /// socket or a device. A file that HEAD, the last commit, does not have is removed from the index
 /// and stays on disk. If some files are in conflict, changes nothing and throws the exception of
-/// shared_vclink::git::Conflicted, which lists them.
+/// shared_vclink::git::Conflicted, which lists them. If something is in the way that
+/// it cannot clear, throws LibGit2Exception with code GIT_ECONFLICT before it writes a file;
+/// docs/limitations.md lists these cases.
 ///
 /// Reports progress. Throws vclink::util::exception::CancelledOperationException if the application
 /// requests it before the first file is written; then the index entries of the files are those of
-/// HEAD, and the files are untouched. After any other failure of the checkout some files may be
+/// HEAD, and the files are untouched, except that a socket or device in their place is gone. After
+/// any other failure of the checkout some files may be
 /// restored. git_reset_default, git_checkout_index.
 ///
 /// @section adapter_getRootFolder getRootFolder
