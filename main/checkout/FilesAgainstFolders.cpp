@@ -14,6 +14,7 @@
 #include "error/errorUtil/GitResult.hpp"
 #include "main/checkout/gitlinks.hpp"
 #include "main/checkout/siblingNames.hpp"
+#include "util/path/foldersAbove.hpp"
 #include "util/repository/repository.hpp"
 
 namespace vclink::git
@@ -121,14 +122,8 @@ Finding findOverlooked(git_repository *repository, const git_tree *before, const
 
 bool isBelow(const Paths &folders, const std::string &path)
 {
-    for (auto end = path.find('/'); end != std::string::npos; end = path.find('/', end + 1))
-    {
-        if (folders.count(path.substr(0, end)) != 0)
-        {
-            return true;
-        }
-    }
-    return false;
+    return anyFolderAbove(path, [&folders](const std::string &above)
+                          { return folders.count(above) != 0; });
 }
 
 Finding findRenameTo(git_repository *repository, git_tree *before, git_tree *after,

@@ -38,10 +38,7 @@ void MergeSubmodules::noteChange(WorkingCopy &copy, const TreeChange &change)
 
 void MergeSubmodules::stage(git_index *index) const
 {
-    for (const Coming &coming : coming_)
-    {
-        addGitlink(index, coming.path, coming.id);
-    }
+    addGitlinks(index, coming_);
 }
 
 void MergeSubmodules::noteUntracked(WorkingCopy &copy, const std::string &name)

@@ -8,6 +8,7 @@
 #include <git2/types.h>
 
 #include "main/checkout/WorkingCopy.hpp"
+#include "main/checkout/gitlinks.hpp"
 #include "main/checkout/treeChanges.hpp"
 
 namespace vclink::git
@@ -41,13 +42,7 @@ class MergeSubmodules
     void settle(git_index *index) const;
 
   private:
-    struct Coming
-    {
-        std::string path;
-        git_oid id;
-    };
-
-    std::vector<Coming> coming_;
+    std::vector<Gitlink> coming_;
     std::vector<std::string> going_;
 };
 

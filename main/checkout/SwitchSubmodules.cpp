@@ -64,7 +64,7 @@ OwnedHandle<git_index> SwitchSubmodules::makeBaseline(const WorkingCopy &copy) c
             }
         }
     }
-    addComing(baseline.get());
+    addGitlinks(baseline.get(), coming_);
     return baseline;
 }
 
@@ -79,15 +79,7 @@ void SwitchSubmodules::settle(git_index *index) const
             check(git_index_remove, index, path.c_str(), 0);
         }
     }
-    addComing(index);
-}
-
-void SwitchSubmodules::addComing(git_index *index) const
-{
-    for (const Coming &coming : coming_)
-    {
-        addGitlink(index, coming.path, coming.id);
-    }
+    addGitlinks(index, coming_);
 }
 
 } // namespace vclink::git

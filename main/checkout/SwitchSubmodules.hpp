@@ -9,6 +9,7 @@
 
 #include "error/errorUtil/OwnedHandle.hpp"
 #include "main/checkout/WorkingCopy.hpp"
+#include "main/checkout/gitlinks.hpp"
 #include "main/checkout/treeChanges.hpp"
 
 namespace vclink::git
@@ -41,16 +42,8 @@ class SwitchSubmodules
     void settle(git_index *index) const;
 
   private:
-    struct Coming
-    {
-        std::string path;
-        git_oid id;
-    };
-
-    void addComing(git_index *index) const;
-
     /// Those that have a folder with files in their place.
-    std::vector<Coming> coming_;
+    std::vector<Gitlink> coming_;
     std::vector<std::string> going_;
     /// Submodules that become files, and files that become submodules, if nothing is in their
     /// place: libgit2 creates the new one only if the baseline does not have the old one.

@@ -15,6 +15,7 @@
 #include "error/errorUtil/GitResult.hpp"
 #include "main/checkout/RemadeFiles.hpp"
 #include "main/checkout/gitlinks.hpp"
+#include "main/checkout/siblingNames.hpp"
 #include "util/repository/repository.hpp"
 
 namespace vclink::git
@@ -108,15 +109,12 @@ bool WorkingCopy::hasSiblingBeforeFolder(const std::string &folder) const
     const std::string name = folder.substr(start);
     const std::string parent = root_ + folder.substr(0, start);
     bool isFound = false;
-    const bool isRead = visitFolder(
-        parent,
-        [&](const std::string &sibling)
-        {
-            const bool isLonger =
-                sibling.size() > name.size() && sibling.compare(0, name.size(), name) == 0;
-            isFound = isLonger && static_cast<unsigned char>(sibling[name.size()]) < '/';
-            return !isFound;
-        });
+    const bool isRead = visitFolder(parent,
+                                    [&](const std::string &sibling)
+                                    {
+                                        isFound = sortsBetweenFileAndFolder(name, sibling);
+                                        return !isFound;
+                                    });
     return isFound || !isRead;
 }
 

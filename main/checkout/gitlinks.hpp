@@ -2,6 +2,7 @@
 #pragma once
 
 #include <string>
+#include <vector>
 
 #include <git2/diff.h>
 #include <git2/index.h>
@@ -29,15 +30,29 @@ inline bool isGitlink(const git_diff_file *file)
     return file != nullptr && file->mode == GIT_FILEMODE_COMMIT;
 }
 
+struct Gitlink
+{
+    std::string path;
+    git_oid id;
+};
+
 /// Adds an entry to an index, in memory, or replaces it. git_index_add.
 /// @throws LibGit2Exception
-inline void addGitlink(git_index *index, const std::string &path, const git_oid &id)
+inline void addGitlink(git_index *index, const Gitlink &gitlink)
 {
     git_index_entry entry{};
-    entry.path = path.c_str();
+    entry.path = gitlink.path.c_str();
     entry.mode = GIT_FILEMODE_COMMIT;
-    entry.id = id;
+    entry.id = gitlink.id;
     check(git_index_add, index, &entry);
+}
+
+inline void addGitlinks(git_index *index, const std::vector<Gitlink> &gitlinks)
+{
+    for (const Gitlink &gitlink : gitlinks)
+    {
+        addGitlink(index, gitlink);
+    }
 }
 
 } // namespace vclink::git

@@ -21,8 +21,7 @@ Obstacle besideSibling(const std::string &path, const std::string &sibling)
                       sibling + "': merge with 'git merge'"};
 }
 
-/// Returns a name of the same folder that sorts between the path and what is below it, as "lib-1"
-/// and "lib.txt" do for "lib". Empty if there is none.
+/// Returns a name of the same folder that sortsBetweenFileAndFolder(). Empty if there is none.
 std::string siblingIn(git_repository *repository, const git_tree *tree, const std::string &path)
 {
     const std::size_t start = path.rfind('/') + 1;
@@ -42,9 +41,7 @@ std::string siblingIn(git_repository *repository, const git_tree *tree, const st
     for (std::size_t i = 0; i < count; ++i)
     {
         const std::string sibling = git_tree_entry_name(git_tree_entry_byindex(tree, i));
-        const bool isLonger =
-            sibling.size() > name.size() && sibling.compare(0, name.size(), name) == 0;
-        if (isLonger && static_cast<unsigned char>(sibling[name.size()]) < '/')
+        if (sortsBetweenFileAndFolder(name, sibling))
         {
             return path.substr(0, start) + sibling;
         }
@@ -53,6 +50,13 @@ std::string siblingIn(git_repository *repository, const git_tree *tree, const st
 }
 
 } // namespace
+
+bool sortsBetweenFileAndFolder(const std::string &name, const std::string &sibling) noexcept
+{
+    const bool isLonger =
+        sibling.size() > name.size() && sibling.compare(0, name.size(), name) == 0;
+    return isLonger && static_cast<unsigned char>(sibling[name.size()]) < '/';
+}
 
 Finding findSibling(git_repository *repository, std::initializer_list<const git_tree *> trees,
                     const std::set<std::string> &paths)

@@ -12,9 +12,12 @@
 namespace vclink::git
 {
 
-/// Finds the first of these paths beside which a tree has a name that sorts between that of the
-/// file and what is in a folder of the same name: "lib-1" and "lib.txt" do so for "lib". libgit2
-/// sees the conflict of a file with a folder only if the two are next to each other.
+/// Returns true if the sibling sorts between a file of this name and what is in a folder of the
+/// same name: "lib-1" and "lib.txt" do so for "lib". libgit2 sees the conflict of a file with a
+/// folder only if the two are next to each other.
+bool sortsBetweenFileAndFolder(const std::string &name, const std::string &sibling) noexcept;
+
+/// Finds the first of these paths beside which a tree has such a sibling.
 /// @throws LibGit2Exception if a tree cannot be read
 Finding findSibling(git_repository *repository, std::initializer_list<const git_tree *> trees,
                     const std::set<std::string> &paths);

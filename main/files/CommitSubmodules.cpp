@@ -113,7 +113,7 @@ void CommitSubmodules::resolve(git_index *index) const
                 check(git_index_remove, index, path, stage);
             }
         }
-        addGitlink(index, submodule.path, submodule.entry.id);
+        addGitlink(index, {submodule.path, submodule.entry.id});
     }
 }
 

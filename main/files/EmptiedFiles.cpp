@@ -6,9 +6,9 @@
 #include <git2/index.h>
 #include <git2/repository.h>
 #include <git2/version.h>
-#include <sys/stat.h>
 
 #include "error/errorUtil/GitResult.hpp"
+#include "util/path/foldersAbove.hpp"
 #include "util/repository/objectIds.hpp"
 
 namespace vclink::git
@@ -17,24 +17,6 @@ namespace
 {
 
 constexpr bool endsAtEmptiedFiles = LIBGIT2_VER_MAJOR == 1 && LIBGIT2_VER_MINOR < 6;
-
-bool isLink(const std::string &path)
-{
-    struct stat status = {};
-    return ::lstat(path.c_str(), &status) == 0 && S_ISLNK(status.st_mode);
-}
-
-bool hasLinkAbove(const std::string &workdir, const std::string &path)
-{
-    for (auto end = path.find('/'); end != std::string::npos; end = path.find('/', end + 1))
-    {
-        if (isLink(workdir + path.substr(0, end)))
-        {
-            return true;
-        }
-    }
-    return false;
-}
 
 /// Whether libgit2 would fail at the empty file, or leave the mark of `git add --intent-to-add`.
 bool isLeft(git_index *index, const ChangedFile &file)

@@ -19,6 +19,7 @@
 #include "error/errorUtil/GitResult.hpp"
 #include "error/errorUtil/raiseSystemError.hpp"
 #include "main/files/EmptiedFiles.hpp"
+#include "util/path/foldersAbove.hpp"
 #include "util/repository/repository.hpp"
 
 namespace vclink::git
@@ -42,28 +43,16 @@ bool isIndexed(git_index *index, const char *path)
 /// if all can.
 int findHidingFolder(const std::string &workdir, const std::string &path)
 {
-    for (auto end = path.find('/'); end != std::string::npos; end = path.find('/', end + 1))
-    {
-        const std::string folder = workdir + path.substr(0, end);
-        if (faccessat(AT_FDCWD, folder.c_str(), R_OK, AT_EACCESS) != 0)
-        {
-            return errno;
-        }
-    }
-    return 0;
-}
-
-bool isBehindLink(const std::string &workdir, const std::string &path)
-{
-    for (auto end = path.find('/'); end != std::string::npos; end = path.find('/', end + 1))
-    {
-        struct stat status = {};
-        if (lstat((workdir + path.substr(0, end)).c_str(), &status) == 0 && S_ISLNK(status.st_mode))
-        {
-            return true;
-        }
-    }
-    return false;
+    int error = 0;
+    anyFolderAbove(path,
+                   [&](const std::string &name)
+                   {
+                       const std::string folder = workdir + name;
+                       error =
+                           faccessat(AT_FDCWD, folder.c_str(), R_OK, AT_EACCESS) != 0 ? errno : 0;
+                       return error != 0;
+                   });
+    return error;
 }
 
 /// Returns why the file cannot be read, or could not before, or 0 if it can or does not exist.
@@ -76,7 +65,7 @@ int findObstacle(const std::string &workdir, const std::string &path)
         // If it can be seen, the refresh would have staged a file or link. Anything else, such as a
         // folder, means that the tracked file is gone.
         const bool isMissed =
-            (S_ISREG(status.st_mode) || S_ISLNK(status.st_mode)) && !isBehindLink(workdir, path);
+            (S_ISREG(status.st_mode) || S_ISLNK(status.st_mode)) && !hasLinkAbove(workdir, path);
         return error == 0 && isMissed ? EIO : error;
     }
     return errno == ENOENT || errno == ENOTDIR ? 0 : errno;

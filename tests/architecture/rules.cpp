@@ -42,7 +42,7 @@ const std::vector<Room> &rooms()
         {"error", {"error/logging"}},
         {"options", {}},
         {"util/path", {}},
-        {"util/repository", {}},
+        {"util/repository", {"util/path"}},
         {"util/scope", {}},
         {"util/lock", {"util/repository", "util/scope"}},
         {"util/command", {"util/scope"}},
