@@ -1,14 +1,16 @@
 // SPDX-License-Identifier: MIT
 #include "main/checkout/PromisedContent.hpp"
 
+#include <algorithm>
 #include <string>
 #include <string_view>
+#include <vector>
 
 #include <git2/odb.h>
-#include <git2/repository.h>
 
 #include "error/errorUtil/GitResult.hpp"
 #include "main/checkout/standing.hpp"
+#include "util/repository/objectFolders.hpp"
 
 namespace vclink::git
 {
@@ -23,16 +25,23 @@ bool isPromisorMark(std::string_view name)
            name.compare(name.size() - suffix.size(), suffix.size(), suffix) == 0;
 }
 
-bool isPartialClone(git_repository *repository)
+bool hasPromisorPack(const std::string &objects)
 {
     bool isMarked = false;
-    visitFolder(git_repository_commondir(repository) + std::string("objects/pack"),
+    visitFolder(objects + "/pack",
                 [&isMarked](const std::string &name)
                 {
                     isMarked = isPromisorMark(name);
                     return !isMarked;
                 });
     return isMarked;
+}
+
+/// The packs of a partial clone can all be in the repository from which it borrows.
+bool isPartialClone(git_repository *repository)
+{
+    const std::vector<std::string> folders = findObjectFolders(repository);
+    return std::any_of(folders.begin(), folders.end(), hasPromisorPack);
 }
 
 } // namespace

@@ -153,7 +153,8 @@ void makeReplacedFolder(GitRepository &repository)
 void makePromising(GitRepository &repository)
 {
     makeBranches(repository);
-    repository.write(".git/objects/pack/pack-of-another-repository.promisor", "");
+    repository.write(".git/objects/info/alternates", "../lender\n");
+    repository.write(".git/lender/pack/pack-of-another-repository.promisor", "");
 }
 
 void makeUpToDate(GitRepository &repository)

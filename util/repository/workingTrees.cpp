@@ -4,7 +4,6 @@
 #include <algorithm>
 #include <array>
 #include <cerrno>
-#include <fstream>
 #include <memory>
 #include <utility>
 
@@ -16,6 +15,7 @@
 #include "error/errorUtil/raiseGitError.hpp"
 #include "error/errorUtil/raiseSystemError.hpp"
 #include "util/path/isSameFolder.hpp"
+#include "util/repository/linesOf.hpp"
 #include "util/repository/settings.hpp"
 
 namespace vclink::git
@@ -33,24 +33,13 @@ bool isAbsent(int error)
     return error == ENOENT || error == ENOTDIR;
 }
 
-/// Returns the lines without blanks at their ends; none if there is no such file.
-std::vector<std::string> linesOf(const std::string &path)
+/// Returns the lines of a file without blanks at their ends; none if there is no such file.
+std::vector<std::string> trimmedLinesOf(const std::string &path)
 {
-    errno = 0;
-    std::ifstream file(path);
-    if (!file && !isAbsent(errno))
-    {
-        raiseUnreadState(path, errno);
-    }
-    std::vector<std::string> lines;
-    for (std::string line; std::getline(file, line);)
+    std::vector<std::string> lines = linesOf(path);
+    for (std::string &line : lines)
     {
         line.erase(line.find_last_not_of(" \t\r") + 1);
-        lines.push_back(line);
-    }
-    if (file.bad())
-    {
-        raiseUnreadState(path, EIO);
     }
     return lines;
 }
@@ -58,7 +47,7 @@ std::vector<std::string> linesOf(const std::string &path)
 /// Returns an empty text if there is no such file.
 std::string firstLineOf(const std::string &path)
 {
-    const std::vector<std::string> lines = linesOf(path);
+    const std::vector<std::string> lines = trimmedLinesOf(path);
     return lines.empty() ? std::string() : lines.front();
 }
 
@@ -160,7 +149,7 @@ bool WorkingTree::moves(const std::string &branch) const
 {
     // The others are the ids before and after.
     constexpr std::size_t linesOfOne = 3;
-    const std::vector<std::string> lines = linesOf(state_ + "rebase-merge/update-refs");
+    const std::vector<std::string> lines = trimmedLinesOf(state_ + "rebase-merge/update-refs");
     for (std::size_t i = 0; i < lines.size(); i += linesOfOne)
     {
         if (lines[i] == branch)
