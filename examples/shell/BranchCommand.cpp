@@ -175,9 +175,13 @@ class BranchCommand : public Command
             {
                 refuseMissingFolder(branch);
                 throw ShellFailure(
-                    say("Nothing was deleted: '%1%' is checked out in the working copy %2%.\n"
-                        "Switch to another branch there first.",
-                        showName(name), quoteName(makePath(branch.root).string())));
+                    branch.isMoved
+                        ? say("Nothing was deleted: a rebase in %2% moves '%1%' when it ends.\n"
+                              "End the rebase first.",
+                              showName(name), showPlace(branch))
+                        : say("Nothing was deleted: '%1%' is checked out in %2%.\nSwitch to "
+                              "another branch there first.",
+                              showName(name), showPlace(branch)));
             }
         }
     }

@@ -132,9 +132,15 @@ class FetchCommand : public Command
             {
                 refuseMissingFolder(branch);
                 throw ShellFailure(
-                    say("Nothing was fetched: that would move the branch '%1%', which is checked "
-                        "out in %2%.\nFetch into refs/remotes/%3%/ instead, and merge.",
-                        showName(branch.name), quoteName(makePath(branch.root).string()), name));
+                    branch.isMoved
+                        ? say("Nothing was fetched: that would move the branch '%1%', which a "
+                              "rebase in %2% moves when it ends.\nFetch into refs/remotes/%3%/ "
+                              "instead, or end the rebase first.",
+                              showName(branch.name), showPlace(branch), name)
+                        : say("Nothing was fetched: that would move the branch '%1%', which is "
+                              "checked out in %2%.\nFetch into refs/remotes/%3%/ instead, and "
+                              "merge.",
+                              showName(branch.name), showPlace(branch), name));
             }
         }
     }

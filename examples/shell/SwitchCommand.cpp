@@ -49,9 +49,9 @@ void refuseCheckedOut(CMAdapter &adapter, const std::string &name)
     if (other)
     {
         refuseMissingFolder(*other);
-        throw ShellFailure(say("Nothing was switched: '%1%' is checked out in the working copy "
-                               "%2%.\nWork there, or switch to another branch there first.",
-                               showName(name), quoteName(makePath(other->root).string())));
+        throw ShellFailure(say("Nothing was switched: '%1%' is checked out in %2%.\nWork there, or "
+                               "switch to another branch there first.",
+                               showName(name), showPlace(*other)));
     }
 }
 

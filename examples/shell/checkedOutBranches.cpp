@@ -35,42 +35,81 @@ std::string shortName(const std::string &line)
                                                               : std::string();
 }
 
-/// The root of the working copy whose state is in this folder, which may be gone; empty if it is
-/// unknown.
-fs::path rootOf(const fs::path &state)
+/// Where git keeps the state of a working copy.
+struct State
 {
-    const std::string entry = readLine(state / "gitdir");
-    const fs::path place = entry.empty() ? state : (state / entry).lexically_normal();
-    return place.filename() == ".git" ? place.parent_path() : fs::path();
-}
+    fs::path folder;
+    /// of the working copy, which may be gone; empty if it is unknown
+    fs::path root;
+    bool isOwn;
+};
 
-void take(const fs::path &state, bool isOwn, std::vector<CheckedOutBranch> &branches)
+void takeMoved(const State &state, std::vector<CheckedOutBranch> &branches)
 {
-    const fs::path root = rootOf(state);
-    if (root.empty())
+    std::ifstream file(state.folder / "rebase-merge/update-refs");
+    std::string line;
+    std::string id;
+    for (; std::getline(file, line); std::getline(file, id), std::getline(file, id))
     {
-        return;
-    }
-    for (const char *const file : {"HEAD", "rebase-merge/head-name", "rebase-apply/head-name"})
-    {
-        const std::string name = shortName(readLine(state / file));
+        const std::string name = shortName(line);
         if (!name.empty())
         {
-            branches.push_back({name, root, isOwn});
+            branches.push_back({name, state.root, state.isOwn, true});
+        }
+    }
+}
+
+void take(const State &state, std::vector<CheckedOutBranch> &branches)
+{
+    for (const char *const file : {"HEAD", "rebase-merge/head-name", "rebase-apply/head-name"})
+    {
+        const std::string name = shortName(readLine(state.folder / file));
+        if (!name.empty())
+        {
+            branches.push_back({name, state.root, state.isOwn, false});
         }
     }
     // The name of the branch, or the id of a commit.
-    const std::string start = readLine(state / "BISECT_START");
+    const std::string start = readLine(state.folder / "BISECT_START");
     if (!start.empty())
     {
-        branches.push_back({start, root, isOwn});
+        branches.push_back({start, state.root, state.isOwn, false});
     }
+    takeMoved(state, branches);
 }
 
 /// Its HEAD checks nothing out, even if its folder is called ".git".
 bool isBare(const fs::path &state)
 {
     return runGit(state, {"rev-parse", "--is-bare-repository"}) == "true\n";
+}
+
+/// A repository does not say where its main working copy is: its folder can be elsewhere, as that
+/// of a submodule is, or with "git init --separate-git-dir".
+fs::path mainRoot(const fs::path &shared)
+{
+    return shared.filename() == ".git" ? shared.parent_path() : fs::path();
+}
+
+/// Without those that git has forgotten.
+std::vector<State> findStates(const fs::path &shared)
+{
+    std::vector<State> states;
+    if (!isBare(shared))
+    {
+        states.push_back({shared, mainRoot(shared), false});
+    }
+    std::error_code ignored;
+    for (const auto &entry : fs::directory_iterator(shared / "worktrees", ignored))
+    {
+        const std::string place = readLine(entry.path() / "gitdir");
+        if (!place.empty())
+        {
+            const fs::path file = (entry.path() / place).lexically_normal();
+            states.push_back({entry.path(), file.parent_path(), false});
+        }
+    }
+    return states;
 }
 
 } // namespace
@@ -80,19 +119,12 @@ std::vector<CheckedOutBranch> findCheckedOutBranches(const fs::path &root)
     std::error_code ignored;
     const fs::path own = fs::weakly_canonical(stateFolder(root), ignored);
     const fs::path shared = fs::weakly_canonical(sharedFolder(own), ignored);
-    std::vector<fs::path> states;
-    if (!isBare(shared))
-    {
-        states.push_back(shared);
-    }
-    for (const auto &entry : fs::directory_iterator(shared / "worktrees", ignored))
-    {
-        states.push_back(entry.path());
-    }
     std::vector<CheckedOutBranch> branches;
-    for (const fs::path &state : states)
+    for (State &state : findStates(shared))
     {
-        take(state, state == own, branches);
+        state.isOwn = state.folder == own;
+        state.root = state.isOwn ? root : state.root;
+        take(state, branches);
     }
     return branches;
 }
@@ -102,21 +134,30 @@ std::optional<CheckedOutBranch> findOtherWorkingCopy(const fs::path &root,
 {
     const std::vector<CheckedOutBranch> branches = findCheckedOutBranches(root);
     const auto found = std::find_if(branches.begin(), branches.end(),
-                                    [&branch](const CheckedOutBranch &checkedOut)
-                                    { return !checkedOut.isOwn && checkedOut.name == branch; });
+                                    [&branch](const CheckedOutBranch &checkedOut) {
+                                        return !checkedOut.isOwn && !checkedOut.isMoved &&
+                                               checkedOut.name == branch;
+                                    });
     return found == branches.end() ? std::nullopt : std::optional(*found);
 }
 
 void refuseMissingFolder(const CheckedOutBranch &branch)
 {
     std::error_code ignored;
-    if (!fs::exists(branch.root, ignored))
+    if (!branch.root.empty() && !fs::exists(branch.root, ignored))
     {
         throw ShellFailure(say("The branch '%1%' is checked out in the working copy %2%, whose "
                                "folder is missing.\nIf it is gone for good, use \"git worktree "
                                "prune\" first.",
                                showName(branch.name), quoteName(makePath(branch.root).string())));
     }
+}
+
+std::string showPlace(const CheckedOutBranch &branch)
+{
+    return branch.root.empty()
+               ? say("the main working copy")
+               : say("the working copy %1%", quoteName(makePath(branch.root).string()));
 }
 
 } // namespace vclink::shell

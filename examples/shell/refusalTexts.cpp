@@ -271,18 +271,25 @@ constexpr Translation refusalRows[] = {
      "Nichts wurde zusammengeführt: '%1%' ist ein annotierter Tag.",
      "何もマージされませんでした。'%1%' は注釈付きのタグです。"},
     {"Nothing was deleted. %1%", "Nichts wurde gelöscht. %1%", "何も削除されませんでした。%1%"},
-    {"Nothing was deleted: '%1%' is checked out in the working copy %2%.\nSwitch to another branch "
-     "there first.",
-     "Nichts wurde gelöscht: '%1%' ist in der Arbeitskopie %2% ausgecheckt.\nWechseln Sie dort "
-     "zuerst zu einem anderen Branch.",
-     "何も削除されませんでした。'%1%' は作業コピー %2% "
-     "でチェックアウトされています。\n先にそこで別のブランチに切り替えてください。"},
+    {"Nothing was deleted: '%1%' is checked out in %2%.\nSwitch to another branch there first.",
+     "Nichts wurde gelöscht: '%1%' ist in %2% ausgecheckt.\nWechseln Sie dort zuerst zu einem "
+     "anderen Branch.",
+     "何も削除されませんでした。'%1%' は%2%でチェックアウトされています。\n"
+     "先にそこで別のブランチに切り替えてください。"},
+    {"Nothing was deleted: a rebase in %2% moves '%1%' when it ends.\nEnd the rebase first.",
+     "Nichts wurde gelöscht: Ein Rebase in %2% bewegt '%1%', wenn er endet.\nBeenden Sie zuerst "
+     "den Rebase.",
+     "何も削除されませんでした。%2%で実行中のリベースが終わるときに '%1%' を動かします。\n"
+     "先にリベースを終わらせてください。"},
     {"Nothing was switched. %1%", "Es wurde nicht gewechselt. %1%", "切り替えませんでした。%1%"},
-    {"Nothing was switched: '%1%' is checked out in the working copy %2%.\nWork there, or switch "
-     "to another branch there first.",
-     "Es wurde nicht gewechselt: '%1%' ist in der Arbeitskopie %2% ausgecheckt.\nArbeiten Sie "
-     "dort, oder wechseln Sie dort zuerst zu einem anderen Branch.",
-     "切り替えませんでした。'%1%' は作業コピー %2% "
+    {"the main working copy", "der Haupt-Arbeitskopie", "メインの作業コピー"},
+    {"the working copy %1%", "der Arbeitskopie %1%", "作業コピー %1% "},
+    {"Nothing was switched: '%1%' is checked out in %2%.\nWork there, or switch to another branch "
+     "there first.",
+     "Es wurde nicht gewechselt: '%1%' ist in %2% ausgecheckt.\nArbeiten Sie dort, oder wechseln "
+     "Sie dort zuerst zu einem anderen Branch.",
+     "切り替えませんでした。'%1%' "
+     "は%2%"
      "でチェックアウトされています。\nそこで作業するか、先にそこで別のブランチに切り替えてください"
      "。"},
     {"The branch '%1%' is checked out in the working copy %2%, whose folder is missing.\nIf it is "
@@ -318,8 +325,15 @@ constexpr Translation refusalRows[] = {
      "into refs/remotes/%3%/ instead, and merge.",
      "Nichts wurde geholt: Das würde den Branch '%1%' bewegen, der in %2% ausgecheckt ist.\nHolen "
      "Sie stattdessen nach refs/remotes/%3%/, und führen Sie zusammen.",
-     "何も取得されませんでした。%2% でチェックアウトされているブランチ '%1%' "
+     "何も取得されませんでした。%2%でチェックアウトされているブランチ '%1%' "
      "が動いてしまいます。\n代わりに refs/remotes/%3%/ に取得して、マージしてください。"},
+    {"Nothing was fetched: that would move the branch '%1%', which a rebase in %2% moves when it "
+     "ends.\nFetch into refs/remotes/%3%/ instead, or end the rebase first.",
+     "Nichts wurde geholt: Das würde den Branch '%1%' bewegen, den ein Rebase in %2% bewegt, wenn "
+     "er endet.\nHolen Sie stattdessen nach refs/remotes/%3%/, oder beenden Sie zuerst den Rebase.",
+     "何も取得されませんでした。%2%で実行中のリベースが終わるときに動かすブランチ '%1%' "
+     "が動いてしまいます。\n代わりに refs/remotes/%3%/ "
+     "に取得するか、先にリベースを終わらせてください。"},
     {"To use an address, give it a name: \"%1%\".", "Geben Sie einer Adresse einen Namen: \"%1%\".",
      "アドレスを使うには名前を付けてください: \"%1%\"。"},
     {"'%1%' is a branch: name the remote before it, e.g. \"%2% %1%\".",

@@ -141,7 +141,7 @@ TEST_F(ShellFetch, MovesNoBranchThatIsCheckedOut)
         arguments.insert(arguments.end(), refspecs.begin(), refspecs.end());
         EXPECT_EQ(refuse(arguments),
                   "Nothing was fetched: that would move the branch '" + branch +
-                      "', which is checked out in " + place +
+                      "', which is checked out in the working copy " + place +
                       ".\nFetch into refs/remotes/origin/ instead, and merge.\n");
         arguments.insert(arguments.begin() + 1, "--quiet");
         EXPECT_NE(repository_.tryGit(arguments).exitStatus, 0) << refspecs.front();
@@ -154,6 +154,79 @@ TEST_F(ShellFetch, MovesNoBranchThatIsCheckedOut)
     succeed({"fetch", "origin", "refs/heads/main:fresh"});
     EXPECT_EQ(references(repository_).at("refs/heads/fresh"),
               references(served_).at("refs/heads/main"));
+}
+
+/// As git, from each working copy.
+TEST_F(ShellFetch, MovesNoBranchThatIsCheckedOutWhereverItsRepositoryIs)
+{
+    const std::filesystem::path root = repository_.path();
+    const std::filesystem::path store = folder() / "store";
+    const std::filesystem::path linked = folder() / "linked";
+    const std::string begin = "vclink-shell: Nothing was fetched: that would move the branch 'main'"
+                              ", which is checked out in the ";
+    const std::string end = ".\nFetch into refs/remotes/origin/ instead, and merge.\n";
+    const auto expectRefused = [&](const std::filesystem::path &own)
+    {
+        SCOPED_TRACE(own);
+        const References before = references(repository_);
+        EXPECT_NE(GitRepository(own).tryGit({"fetch", "origin", "main:main"}).exitStatus, 0);
+        EXPECT_EQ(runIn(own, {"fetch", "origin", "main:main"}).errors,
+                  begin + "working copy " + own.string() + end);
+        GitRepository(own).git({"worktree", "add", "--quiet", "--detach", linked.string()});
+        EXPECT_NE(GitRepository(linked).tryGit({"fetch", "origin", "main:main"}).exitStatus, 0);
+        EXPECT_EQ(runIn(linked, {"fetch", "origin", "main:main"}).errors,
+                  begin + "main working copy" + end);
+        GitRepository(own).git({"worktree", "remove", linked.string()});
+        EXPECT_EQ(references(repository_), before);
+    };
+    std::filesystem::rename(root / ".git", store);
+    std::filesystem::create_directory_symlink("../" + store.filename().string(), root / ".git");
+    expectRefused(root);
+    std::filesystem::remove(root / ".git");
+    repository_.write(".git", "gitdir: " + store.string() + '\n');
+    expectRefused(root);
+    const GitRepository parent(folder() / "parent");
+    std::filesystem::create_directory(parent.path());
+    parent.git({"init", "--quiet"});
+    parent.git({"submodule", "--quiet", "add", url_, "sub"});
+    GitRepository(parent / "sub").git({"reset", "--quiet", "--hard", "main~"});
+    expectRefused(parent / "sub");
+}
+
+/// As git.
+TEST_F(ShellFetch, MovesNoBranchThatARebaseMoves)
+{
+    const std::string linked = (folder() / "linked").string();
+    repository_.git({"switch", "--quiet", "-c", "lower"});
+    repository_.write("a", "ours\n");
+    repository_.commitAll("ours");
+    repository_.git({"branch", "middle"});
+    repository_.write("folder/b", "ours\n");
+    repository_.commitAll("ours, too");
+    repository_.git({"worktree", "add", "--quiet", "-b", "side", linked, "main"});
+    repository_.git({"fetch", "--quiet", "origin"});
+    ASSERT_NE(repository_.tryGit({"rebase", "--update-refs", "origin/main"}).exitStatus, 0);
+    for (const auto &root : {repository_.path(), std::filesystem::path(linked)})
+    {
+        EXPECT_NE(
+            GitRepository(root).tryGit({"fetch", "--quiet", "origin", "+main:middle"}).exitStatus,
+            0);
+        EXPECT_EQ(runIn(root, {"fetch", "origin", "+main:middle"}).errors,
+                  "vclink-shell: Nothing was fetched: that would move the branch 'middle', which a "
+                  "rebase in the working copy " +
+                      repository_.path().string() +
+                      " moves when it ends.\nFetch into refs/remotes/origin/ instead, or end the "
+                      "rebase first.\n");
+    }
+    EXPECT_EQ(runIn(linked, {"branch", "-d", "middle"}).errors,
+              "vclink-shell: Nothing was deleted: a rebase in the working copy " +
+                  repository_.path().string() +
+                  " moves 'middle' when it ends.\nEnd the rebase first.\n");
+    EXPECT_NE(GitRepository(linked).tryGit({"branch", "-D", "middle"}).exitStatus, 0);
+    // git switches, too.
+    EXPECT_EQ(runIn(linked, {"switch", "middle"}).errors, "");
+    GitRepository(linked).git({"switch", "--quiet", "side"});
+    GitRepository(linked).git({"switch", "--quiet", "middle"});
 }
 
 /// As git.
