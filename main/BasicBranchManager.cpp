@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "main/BasicBranchManager.hpp"
 
+#include <algorithm>
 #include <array>
 #include <string_view>
 #include <utility>
@@ -24,6 +25,7 @@
 #include "util/lock/IndexLock.hpp"
 #include "util/lock/PackedReferences.hpp"
 #include "util/lock/referenceLocks.hpp"
+#include "util/repository/brokenLinks.hpp"
 #include "util/repository/objectIds.hpp"
 #include "util/repository/reflogAccess.hpp"
 #include "util/repository/repository.hpp"
@@ -36,7 +38,27 @@ namespace
 
 constexpr std::string_view branchFolder = "refs/heads/";
 
-std::vector<BranchPointer> listBranches(git_branch_t type, git_repository *repository)
+/// Adds the branches that libgit2 leaves out because of a broken link.
+void addOverlooked(git_branch_t type, git_repository *repository,
+                   std::vector<BranchPointer> &branches)
+{
+    const std::string folder = type == GIT_BRANCH_LOCAL ? "refs/heads" : "refs/remotes";
+    for (const std::string &name : findFilesBesideBrokenLink(repository, folder))
+    {
+        const BranchPointer branch(name);
+        const bool isListed = std::find(branches.begin(), branches.end(), branch) != branches.end();
+        const char *const shortName = name.c_str() + folder.size() + 1;
+        // As libgit2, leaves out what is no branch.
+        if (!isListed &&
+            acquire<git_reference>(git_branch_lookup, repository, shortName, type).has_value())
+        {
+            branches.push_back(branch);
+        }
+    }
+}
+
+/// Those that libgit2's iterator finds.
+std::vector<BranchPointer> iterateBranches(git_branch_t type, git_repository *repository)
 {
     const OwnedHandle<git_branch_iterator> iterator =
         acquire<git_branch_iterator>(git_branch_iterator_new, repository, type).value();
@@ -55,6 +77,13 @@ std::vector<BranchPointer> listBranches(git_branch_t type, git_repository *repos
             branches.emplace_back(git_reference_name(branch.get()));
         }
     }
+}
+
+std::vector<BranchPointer> listBranches(git_branch_t type, git_repository *repository)
+{
+    std::vector<BranchPointer> branches = iterateBranches(type, repository);
+    addOverlooked(type, repository, branches);
+    return branches;
 }
 
 OwnedHandle<git_reference> lookupLocalBranch(git_repository *repository, const char *name)

@@ -120,6 +120,7 @@ std::vector<Operation> branchOperations()
     const std::string refused = "vclink::git::LibGit2Exception";
     return {
         {"getLocalBranches", makeBranches, asking(getLocalBranches), "", {}, false},
+        {"listBesideBrokenLink", makeBrokenLink, asking(getLocalBranches), "", {}, false},
         {"getRemoteBranches", makeBranches, asking(getRemoteBranches), "", {}, false},
         {"getHeadRevision", makeBranches, asking(getHeadRevision), "", {}, false},
         {"getRevisionId", makeBranches, asking(getRevisionId), "", {}, false},

@@ -198,6 +198,11 @@ std::vector<Tolerance> tolerancesOfOthers(const std::string &operation, const st
         {"getLocalBranches", "git_branch_next", 1, GIT_ITEROVER, "done: "},
         {"getLocalBranches", "git_branch_next", 2, GIT_ITEROVER, "done: refs/heads/main "},
         {"getLocalBranches", "git_branch_next", 3, GIT_ITEROVER, normal},
+        {"listBesideBrokenLink", "git_branch_next", any, GIT_ITEROVER, normal},
+        // What cannot be looked up is no branch. The first one is the link.
+        {"listBesideBrokenLink", "git_branch_lookup", 1, any, normal},
+        {"listBesideBrokenLink", "git_branch_lookup", 2, any, "done: refs/heads/topic "},
+        {"listBesideBrokenLink", "git_branch_lookup", 3, any, "done: refs/heads/main "},
         {"getRemoteBranches", "git_branch_next", 1, GIT_ITEROVER, "done: "},
         {"getRemoteBranches", "git_branch_next", 2, GIT_ITEROVER, normal},
         {"merge", "git_index_conflict_next", any, GIT_ITEROVER, normal},

@@ -150,6 +150,12 @@ void makeReplacedFolder(GitRepository &repository)
     repository.makeBranch("topic", removes("folder") + writes("folder", "theirs\n"));
 }
 
+void makeBrokenLink(GitRepository &repository)
+{
+    makeBranches(repository);
+    links("nowhere", ".git/refs/heads/broken")(repository);
+}
+
 void makePromising(GitRepository &repository)
 {
     makeBranches(repository);

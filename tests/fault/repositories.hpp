@@ -38,6 +38,8 @@ void makeLinkedTree(GitRepository &repository);
 void makeLinkedFolder(GitRepository &repository);
 /// Plain with "folder/deep/inside", and the branch "topic", where "folder" is a file.
 void makeReplacedFolder(GitRepository &repository);
+/// makeBranches() with a link among the branches that leads nowhere.
+void makeBrokenLink(GitRepository &repository);
 /// makeBranches(), where contents may be missing. None is.
 void makePromising(GitRepository &repository);
 /// Branches, with main where "topic" is.

@@ -48,10 +48,11 @@ class VCLINK_GIT_EXPORT BranchManager
     virtual ~BranchManager();
 
     /// Returns the full names of the local branches, beginning with "refs/heads/", in libgit2's
-    /// order. git_branch_next.
+    /// order. Those that libgit2 leaves out because of a broken link below `refs/` come last.
+    /// git_branch_next.
     virtual std::vector<BranchPointer> getLocalBranches() const = 0;
     /// Returns the full names of the remote-tracking branches, beginning with "refs/remotes/", in
-    /// libgit2's order. git_branch_next.
+    /// libgit2's order, as getLocalBranches. git_branch_next.
     virtual std::vector<BranchPointer> getRemoteBranches() const = 0;
 
     /// Returns the id of HEAD, 40 hexadecimal digits, as getRevision("HEAD") does.

@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: MIT
 #include <algorithm>
+#include <filesystem>
 #include <string>
 #include <type_traits>
 #include <vector>
@@ -75,6 +76,39 @@ TEST_F(BranchLists, HoldTheFullNameOfEachBranchOnceOnItsOwnSideAsGitDoes)
     EXPECT_THAT(remote(), ElementsAre("refs/remotes/origin/main", "refs/remotes/upstream/topic"));
     EXPECT_EQ(remote(), byGit("refs/remotes"));
     EXPECT_EQ(branches().getCurrentBranch().getName(), "main");
+}
+
+/// libgit2's iterator ends there.
+TEST_F(BranchLists, AreWholeBesideABrokenLinkAsGitsAre)
+{
+    repository_.commitAll("first");
+    for (const std::string name : {"a", "folder/a", "folder/z", "packed", "z"})
+        repository_.git({"branch", name});
+    repository_.git({"pack-refs", "--all"});
+    for (const std::string name : {"a", "folder/a", "folder/z", "main", "z"})
+        repository_.git({"update-ref", "refs/heads/" + name,
+                         repository_.line({"commit-tree", "HEAD^{tree}", "-m", name})});
+    for (const std::string name : {"origin/main", "upstream/new"})
+        repository_.git({"update-ref", "refs/remotes/" + name, "HEAD"});
+    repository_.git({"branch", "new"});
+    repository_.git({"symbolic-ref", "refs/heads/alias", "refs/heads/main"});
+    writes(".git/refs/heads/folder/garbage", "garbage\n")(repository_);
+    writes(".git/refs/heads/y.lock", "")(repository_);
+    for (const std::string link : {"folder/b", "b", "../b", "../remotes/b", "../tags/b"})
+        for (const std::string target : {"nowhere", ".", "b"})
+        {
+            SCOPED_TRACE(link + " -> " + target);
+            const auto place = repository_ / ".git/refs/heads" / link;
+            std::filesystem::create_symlink(target, place);
+            if (target != ".") // git follows the circle
+            {
+                EXPECT_THAT(local(), testing::UnorderedElementsAreArray(byGit("refs/heads")));
+                EXPECT_THAT(remote(), testing::UnorderedElementsAreArray(byGit("refs/remotes")));
+            }
+            EXPECT_THAT(local(), testing::IsSupersetOf({"refs/heads/z", "refs/heads/new"}));
+            EXPECT_THAT(remote(), testing::Contains("refs/remotes/upstream/new"));
+            std::filesystem::remove(place);
+        }
 }
 
 /// Which is not that of their names.
