@@ -1,10 +1,13 @@
 // SPDX-License-Identifier: MIT
 #include "mergeObstacles.hpp"
 
+#include <filesystem>
 #include <map>
 #include <utility>
+#include <vector>
 
 #include "fl/i18n/convert.hpp"
+#include "indexEntries.hpp"
 #include "names.hpp"
 #include "revisions.hpp"
 #include "states.hpp"
@@ -63,11 +66,57 @@ class TopOfTheirs
     std::map<std::string, Kind> kinds_;
 };
 
-/// To the back end a submodule is a file. Its commit is not in this repository.
-bool isSubmodule(const git::BranchManager &manager, const std::string &name)
+/// What the back end reports as missing, told apart.
+class MissingEntries
 {
-    return !findRevision(manager, "HEAD:" + name);
-}
+  public:
+    MissingEntries(const git::BranchManager &manager, std::filesystem::path root)
+        : manager_(manager), root_(std::move(root))
+    {
+    }
+
+    /// To the back end a submodule is a file.
+    bool isSubmodule(const std::string &name)
+    {
+        // Without git: its commit is not in this repository. Contents can lack in a partial clone.
+        return canBeRead() ? find(name).mode == submoduleMode
+                           : !findRevision(manager_, "HEAD:" + name);
+    }
+
+    /// Whether a sparse checkout leaves it out.
+    bool isLeftOut(const std::string &name)
+    {
+        return canBeRead() && find(name).isSkipped;
+    }
+
+  private:
+    bool canBeRead()
+    {
+        if (!isRead_)
+        {
+            isRead_ = true;
+            const auto entries = readIndex(root_);
+            canBeRead_ = entries.has_value();
+            for (const IndexEntry &entry : entries.value_or(std::vector<IndexEntry>()))
+            {
+                entries_.emplace(entry.name, entry);
+            }
+        }
+        return canBeRead_;
+    }
+
+    IndexEntry find(const std::string &name) const
+    {
+        const auto found = entries_.find(name);
+        return found == entries_.end() ? IndexEntry() : found->second;
+    }
+
+    const git::BranchManager &manager_;
+    std::filesystem::path root_;
+    bool isRead_ = false;
+    bool canBeRead_ = false;
+    std::map<std::string, IndexEntry> entries_;
+};
 
 } // namespace
 
@@ -75,15 +124,20 @@ MergeObstacles findMergeObstacles(CMAdapter &adapter, const std::optional<std::s
 {
     const auto manager = git::BranchManager::create(adapter);
     TopOfTheirs top(*manager, theirs.value_or(""));
+    MissingEntries missing(*manager, nativePath(adapter.getRootFolder()));
     MergeObstacles obstacles;
     for (const auto &entry : wholeStates(adapter))
     {
         const FileState::State state = entry.second.getState();
         const std::string name =
             fl::i18n::ustring_to_utf8(relativeName(entry.first, adapter.getRootFolder()));
-        if (state == FileState::Missing && isSubmodule(*manager, name))
+        if (state == FileState::Missing && missing.isSubmodule(name))
         {
             obstacles.missingSubmodules.insert(entry);
+        }
+        else if (state == FileState::Missing && missing.isLeftOut(name))
+        {
+            continue;
         }
         else if (isChanged(state))
         {

@@ -13,7 +13,8 @@ namespace vclink::shell
 /// What may be lost in a merge that was refused. The back end names one file, or none.
 struct MergeObstacles
 {
-    /// tracked files with changes that are not committed, missing ones included
+    /// tracked files with changes that are not committed, including missing ones, but not those
+    /// that a sparse checkout leaves out
     FileStateMap changed;
     /// untracked files where the other side has something
     FileStateMap untracked;

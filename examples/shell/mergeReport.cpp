@@ -85,6 +85,13 @@ void tellObstacles(const MergeObstacles &obstacles)
     }
 }
 
+/// In a partial clone. Nothing in the working copy is in the way then.
+bool lacksContent(const MergeNotes &notes)
+{
+    return notes.failure == wouldLoseWork &&
+           notes.text.find("is not in this partial clone") != std::string::npos;
+}
+
 } // namespace
 
 void tellConflicts(CMAdapter &adapter, const MergeNotes &notes)
@@ -114,7 +121,12 @@ void tellRefusal(CMAdapter &adapter, const MergeNotes &notes,
                  const std::optional<std::string> &theirs)
 {
     const std::string word = firstWord(notes.command);
-    if (notes.failure == wouldLoseWork)
+    if (lacksContent(notes))
+    {
+        complain(say("Nothing was merged. Use \"git merge\" for this, which downloads what is "
+                     "missing."));
+    }
+    else if (notes.failure == wouldLoseWork)
     {
         tellObstacles(findMergeObstacles(adapter, theirs));
         complain(say("Nothing was merged. Commit the changes that would be lost, or move the files "

@@ -176,6 +176,10 @@ constexpr Translation refusalRows[] = {
      "Sie die\nDateien aus dem Weg, und führen Sie noch einmal zusammen.",
      "何もマージされませんでした。失われる変更をコミットするか、ファイルを別の場所に移してから、も"
      "う一度\nマージしてください。"},
+    {"Nothing was merged. Use \"git merge\" for this, which downloads what is missing.",
+     "Nichts wurde zusammengeführt. Benutzen Sie dafür \"git merge\", das herunterlädt, was fehlt.",
+     "何もマージされませんでした。不足しているものをダウンロードする \"git merge\" "
+     "を使ってください。"},
     {"The merge command can't be started: '%1%' is no program. Correct the setting "
      "merge.%2%.driver: %3%",
      "Der Merge-Befehl kann nicht gestartet werden: '%1%' ist kein Programm. Berichtigen Sie die "

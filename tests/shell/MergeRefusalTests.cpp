@@ -125,6 +125,37 @@ TEST_F(ShellMergeOverChanges, TellsHowToBringBackASubmoduleThatIsMissing)
     EXPECT_EQ(repository_.line({"rev-parse", "HEAD:module"}), second);
 }
 
+/// Its contents may lack, as those of a submodule do.
+TEST_F(ShellMergeOverChanges, SaysThatGitDownloadsWhatAPartialCloneLacks)
+{
+    diverge();
+    const auto source = folder() / "source";
+    std::filesystem::rename(repository_.path(), source);
+    GitRepository(source).git({"config", "uploadpack.allowFilter", "true"});
+    GitRepository(source).git({"clone", "--quiet", "--filter=blob:none", "--no-checkout",
+                               "file://" + source.string(), repository_.path().string()});
+    repository_.git({"config", "core.sparseCheckout", "true"});
+    repository_.write(".git/info/sparse-checkout", "/b\n");
+    repository_.git({"checkout", "--quiet", "main"});
+    repository_.git({"branch", "other", "origin/other"});
+    repository_.git({"config", "user.name", "A"});
+    repository_.git({"config", "user.email", "a@example.org"});
+    const std::string before = describe(repository_);
+    EXPECT_THAT(fail({"merge", "other"}),
+                EndsWith("is not in this partial clone, and only git fetches it: use git for this "
+                         "(code -13, category 20)\nvclink-shell: Nothing was merged. Use \"git "
+                         "merge\" for this, which downloads what is missing.\n"));
+    EXPECT_EQ(describe(repository_), before);
+    // Downloads what has changed. Left out are also other files.
+    repository_.git({"diff", "main~", "main"});
+    repository_.git({"diff", "main~", "other"});
+    repository_.write("b", "edited\n");
+    expectRefused("\nvclink-shell: These files have uncommitted changes:\n  b\nvclink-shell: "
+                  "Nothing");
+    repository_.git({"checkout", "--quiet", "b"});
+    repository_.git({"merge", "--quiet", "other"});
+}
+
 TEST_F(ShellMergeOverChanges, GoesOnWhereNothingIsLost)
 {
     diverge();
