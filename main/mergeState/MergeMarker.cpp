@@ -8,12 +8,12 @@
 #include <fcntl.h>
 #include <git2/oid.h>
 #include <git2/repository.h>
-#include <sys/stat.h>
 #include <unistd.h>
 
 #include "error/errorUtil/raiseSystemError.hpp"
 #include "util/repository/objectIds.hpp"
 #include "util/scope/FileDescriptor.hpp"
+#include "util/scope/newFile.hpp"
 
 namespace vclink::git
 {
@@ -45,20 +45,6 @@ std::string readIdLine(const std::string &path)
     return line;
 }
 
-/// Returns 0, or the errno of the call that failed. Then there is no such file.
-int createFile(const std::string &path, const std::string &text) noexcept
-{
-    const FileDescriptor file(::open(path.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC,
-                                     S_IRUSR | S_IWUSR | S_IRGRP | S_IROTH));
-    if (file && ::write(file.get(), text.data(), text.size()) == static_cast<ssize_t>(text.size()))
-    {
-        return 0;
-    }
-    const int error = errno;
-    ::unlink(path.c_str());
-    return error;
-}
-
 } // namespace
 
 MergeMarker::MergeMarker(git_repository *repository, const MergeSides &sides)
@@ -67,13 +53,13 @@ MergeMarker::MergeMarker(git_repository *repository, const MergeSides &sides)
       autoMerge_(readIdLine(autoMergePath_))
 {
     removeMergeMarker(repository);
-    // libgit2 leaves it when it ends a merge.
-    ::unlink(autoMergePath_.c_str());
     const int error = createFile(path_, lineOf(sides.ours) + lineOf(sides.theirs));
     if (error != 0)
     {
         raiseSystemError(error, "could not write '" + path_ + "'");
     }
+    // libgit2 leaves it when it ends a merge.
+    ::unlink(autoMergePath_.c_str());
 }
 
 MergeMarker::~MergeMarker()

@@ -4,18 +4,15 @@
 #include <cerrno>
 #include <string>
 
-#include <fcntl.h>
 #include <git2/commit.h>
 #include <git2/errors.h>
 #include <git2/oid.h>
 #include <git2/repository.h>
-#include <sys/stat.h>
-#include <unistd.h>
 
 #include "error/errorUtil/raiseGitError.hpp"
 #include "error/errorUtil/raiseSystemError.hpp"
 #include "util/repository/objectIds.hpp"
-#include "util/scope/FileDescriptor.hpp"
+#include "util/scope/newFile.hpp"
 
 namespace vclink::git
 {
@@ -25,16 +22,9 @@ void restoreMergeHead(git_repository *repository, const git_oid &theirs)
     const std::string path = git_repository_path(repository) + std::string("MERGE_HEAD");
     std::string line(idTextSize + 1, '\n');
     git_oid_fmt(line.data(), &theirs);
-    const FileDescriptor file(
-        ::open(path.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, DEFFILEMODE));
-    if (!file && errno == EEXIST)
+    const int error = createFile(path, line);
+    if (error != 0 && error != EEXIST)
     {
-        return;
-    }
-    if (!file || ::write(file.get(), line.data(), line.size()) != static_cast<ssize_t>(line.size()))
-    {
-        const int error = errno;
-        ::unlink(path.c_str());
         raiseSystemError(error, "could not write '" + path + "'");
     }
 }

@@ -11,6 +11,7 @@
 #include <fcntl.h>
 
 #include "error/errorUtil/raiseSystemError.hpp"
+#include "util/scope/newFile.hpp"
 
 namespace vclink::git
 {
@@ -35,23 +36,6 @@ void removeIfThere(const std::string &path)
     {
         raiseSystemError(errno, "could not remove '" + path + "'");
     }
-}
-
-/// @return the errno, or 0
-int writeAll(const FileDescriptor &file, const char *data, std::size_t size) noexcept
-{
-    while (size > 0)
-    {
-        const ssize_t written = ::write(file.get(), data, size);
-        if (written < 0 && errno != EINTR)
-        {
-            return errno;
-        }
-        const std::size_t count = written < 0 ? 0 : static_cast<std::size_t>(written);
-        data += count;
-        size -= count;
-    }
-    return 0;
 }
 
 } // namespace
