@@ -26,12 +26,12 @@ bool WorkingCopy::isReadable(const std::string &name)
 
 bool WorkingCopy::isIgnored(const std::string &name) const
 {
-    return isIgnoredByLibGit2(name) && !mayBeNegated(repository_, root_, name);
+    return isIgnoredByLibGit2(name) && !mayBeNegated(repository_, index(), root_, name);
 }
 
 bool WorkingCopy::isFalselyIgnored(const std::string &name) const
 {
-    return isIgnoredByLibGit2(name) && mayBeNegated(repository_, root_, name);
+    return isIgnoredByLibGit2(name) && mayBeNegated(repository_, index(), root_, name);
 }
 
 bool WorkingCopy::isIgnoredByLibGit2(const std::string &name) const

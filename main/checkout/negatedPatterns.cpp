@@ -10,6 +10,7 @@
 #include <git2/buffer.h>
 #include <git2/config.h>
 #include <git2/errors.h>
+#include <git2/index.h>
 #include <git2/repository.h>
 
 #include "error/errorUtil/GitResult.hpp"
@@ -22,12 +23,40 @@ namespace
 
 constexpr const char *byteOrderMark = "\xEF\xBB\xBF";
 
-/// Returns the part of a pattern that the name of a file or of a folder above it must match.
+/// Returns true for a slash such as that in [a/], at which the pattern cannot be split.
+bool isInClass(const std::string &pattern, std::size_t slash)
+{
+    const auto open = slash == std::string::npos ? slash : pattern.rfind('[', slash);
+    // The first character of a class can be the one that ends it elsewhere.
+    return open != std::string::npos && pattern.find(']', open + 2) > slash;
+}
+
+/// Returns the part of a pattern that the name of a file or of a folder above it must match. Tabs
+/// and carriage returns at the end may be a part of the name, and a backslash there may escape a
+/// blank: then any end matches.
 std::string lastElement(std::string pattern)
 {
     const auto end = pattern.find_last_not_of(" \t\r/");
-    pattern.resize(end == std::string::npos ? 0 : end + 1);
-    return pattern.substr(pattern.rfind('/') + 1);
+    const std::size_t size = end == std::string::npos ? 0 : end + 1;
+    const bool hasMore = pattern.find_first_of("\t\r", size) != std::string::npos;
+    pattern.resize(size);
+    const bool isEscaped = !pattern.empty() && pattern.back() == '\\';
+    if (hasMore || isEscaped)
+    {
+        pattern.resize(pattern.find_last_not_of('\\') + 1);
+        pattern += '*';
+    }
+    const auto slash = pattern.rfind('/');
+    return isInClass(pattern, slash) ? "*" : pattern.substr(slash + 1);
+}
+
+/// Returns true also if the pattern cannot be understood. A class such as [!a] can match more
+/// names if the case counts.
+bool mayMatch(const std::string &pattern, const std::string &element)
+{
+    const auto may = [&](int flags)
+    { return ::fnmatch(pattern.c_str(), element.c_str(), flags) != FNM_NOMATCH; };
+    return may(0) || may(FNM_CASEFOLD);
 }
 
 bool matchesAnElement(const std::string &pattern, const std::string &name)
@@ -36,7 +65,7 @@ bool matchesAnElement(const std::string &pattern, const std::string &name)
     for (auto end = name.find('/'); begin < name.size(); end = name.find('/', begin))
     {
         const std::string element = name.substr(begin, end - begin);
-        if (::fnmatch(pattern.c_str(), element.c_str(), FNM_CASEFOLD) == 0)
+        if (mayMatch(pattern, element))
         {
             return true;
         }
@@ -52,14 +81,20 @@ struct Name
     bool isLink;
 };
 
-/// Whether libgit2 takes the line for another pattern than git does. It removes tabs at the end,
-/// and stops at a form feed; git does neither, and the pattern then hardly ever matches anything.
-/// It takes a link to a folder for a folder.
+/// Whether libgit2 takes the line for another pattern than git does. It removes tabs and a single
+/// backslash at the end and carriage returns at the beginning, and stops at a form feed; git does
+/// none of these, and the pattern then hardly ever matches anything. It takes a link to a folder
+/// for a folder.
 bool isReadOtherwise(const std::string &line, bool isLink)
 {
-    const auto last = line.find_last_not_of(" \r");
-    return line.find_first_of("\v\f") != std::string::npos ||
-           (last != std::string::npos && (line[last] == '\t' || (isLink && line[last] == '/')));
+    const auto lastOf = [&line](const char *others)
+    {
+        const auto last = line.find_last_not_of(others);
+        return last == std::string::npos ? '\0' : line[last];
+    };
+    const char end = lastOf(" \r/");
+    return line.find_first_of("\v\f") != std::string::npos || end == '\t' || end == '\\' ||
+           (isLink && lastOf(" \r") == '/') || (!line.empty() && line.front() == '\r');
 }
 
 bool isDoubtful(const std::string &line, const Name &name)
@@ -69,7 +104,12 @@ bool isDoubtful(const std::string &line, const Name &name)
     {
         return false;
     }
-    const std::string pattern = line.substr(isNegated ? 1 : 0);
+    std::string pattern = line.substr(isNegated ? 1 : 0);
+    if (!pattern.empty() && pattern.front() == '\r')
+    {
+        // With or without them.
+        pattern.replace(0, pattern.find_first_not_of('\r'), "*");
+    }
     return matchesAnElement(lastElement(pattern.substr(0, pattern.find_first_of("\v\f"))),
                             name.path);
 }
@@ -86,6 +126,10 @@ bool mayNegate(const std::string &path, const Name &name)
         if (line.rfind(byteOrderMark, 0) == 0)
         {
             line.erase(0, 3);
+        }
+        if (!line.empty() && line.back() == '\r')
+        {
+            line.pop_back();
         }
         if (isDoubtful(line, name))
         {
@@ -113,10 +157,20 @@ std::string excludesFile(git_repository *repository)
     return {path.ptr, path.size};
 }
 
-/// git does not follow a link in the working tree.
-bool mayNegateInTree(const std::string &path, const Name &name)
+/// git does not follow a link in the working tree, and reads a file that a sparse checkout leaves
+/// out from the index.
+bool mayNegateInTree(const std::string &root, const std::string &file, git_index *index,
+                     const Name &name)
 {
-    return standingAt(path) == Standing::Link || mayNegate(path, name);
+    const std::string path = root + file;
+    const Standing standing = standingAt(path);
+    if (standing == Standing::Nothing)
+    {
+        const git_index_entry *const entry =
+            git_index_get_bypath(index, file.c_str(), GIT_INDEX_STAGE_NORMAL);
+        return entry != nullptr && (entry->flags_extended & GIT_INDEX_ENTRY_SKIP_WORKTREE) != 0;
+    }
+    return standing == Standing::Link || mayNegate(path, name);
 }
 
 std::string inEnvironment(const char *variable, const char *path)
@@ -127,7 +181,8 @@ std::string inEnvironment(const char *variable, const char *path)
 
 } // namespace
 
-bool mayBeNegated(git_repository *repository, const std::string &root, const std::string &name)
+bool mayBeNegated(git_repository *repository, git_index *index, const std::string &root,
+                  const std::string &name)
 {
     const Name named{name, standingAt(root + name) == Standing::Link};
     for (const std::string &path :
@@ -140,13 +195,13 @@ bool mayBeNegated(git_repository *repository, const std::string &root, const std
             return true;
         }
     }
-    if (mayNegateInTree(root + ".gitignore", named))
+    if (mayNegateInTree(root, ".gitignore", index, named))
     {
         return true;
     }
     for (auto end = name.find('/'); end != std::string::npos; end = name.find('/', end + 1))
     {
-        if (mayNegateInTree(root + name.substr(0, end) + "/.gitignore", named))
+        if (mayNegateInTree(root, name.substr(0, end) + "/.gitignore", index, named))
         {
             return true;
         }

@@ -71,10 +71,20 @@ INSTANTIATE_TEST_SUITE_P(
                     Negation{{"ANestedFileFromItsFolder"}, "d/x.log", "*.log\n", "!/x.log\n"},
                     Negation{{"AnotherFile"}, "x.log", "!x.log\n", "", "*.log\n"},
                     Negation{{"AFolderAbove"}, "d/e/a", "d/*/a\n", "!e/a\n"},
+                    Negation{{"AnEscapedBlank"}, "d/README ", "d/*\n", "!README\\ \n"},
+                    Negation{{"ANameWithATab"}, "d/README\t", "d/*\n", "!README\t\n"},
+                    Negation{{"ANameWithACarriageReturn"}, "d/x\r", "d/*\n", "!x\r\r\n"},
+                    Negation{{"AClassAndATab"}, "d/x\t", "d/*\n", "![!X]\t\n"},
                     // No negations, but also other patterns for libgit2 than for git.
                     Negation{{"ATabAtTheEnd"}, "x.log", "*.log\t\n"},
                     Negation{{"ATabAndACarriageReturn"}, "x.log", "x.log \t \r\n"},
-                    Negation{{"AFormFeed"}, "d/x.log", "d/*.log\f# logs\n"}),
+                    Negation{{"AFormFeed"}, "d/x.log", "d/*.log\f# logs\n"},
+                    Negation{{"ABackslashAtTheEnd"}, "d/x.log", "d\\\r\n"},
+                    Negation{{"ABackslashBeforeTheLastSlash"}, "d/x.log", "d\\/\n"},
+                    Negation{{"AnEscapedBlankAndATab"}, "d/x ", "*\\ \t\n"},
+                    Negation{{"ACarriageReturnInFront"}, "x.log", "x\n\rx.log\n"},
+                    Negation{{"AClassThatCountsCase"}, "x.log", "[!X].log\t\n"},
+                    Negation{{"AClassWithASlash"}, "x.log", "x[/.]log\t\n"}),
     testing::PrintToStringParamName());
 
 /// git does not follow the link.
@@ -99,6 +109,34 @@ TEST_P(LinkedPatterns, KeepUntrackedFilesAsInGit)
 
 INSTANTIATE_TEST_SUITE_P(In, LinkedPatterns, testing::Values(".gitignore", "d/.gitignore"),
                          [](const auto &row) { return row.index == 0 ? "TheRoot" : "AFolder"; });
+
+/// git reads the patterns that a sparse checkout leaves out from the index.
+class LeftOutPatterns : public ObstacleFixture
+{
+};
+
+TEST_F(LeftOutPatterns, KeepUntrackedFilesAsInGit)
+{
+    repository_.write(".gitignore", "d/*\n!d/.gitignore\n");
+    repository_.write("d/.gitignore", "!README\n");
+    repository_.commitAll("patterns");
+    makeBranch("topic", writes("d/README", "theirs\n"));
+    repository_.commitAll(writes("ours", "x"), "ours");
+    repository_.git({"update-index", "--skip-worktree", "d/.gitignore"});
+    repository_.remove("d/.gitignore");
+    repository_.write("d/README", "mine\n");
+    ASSERT_FALSE(repository_.tryGit({"check-ignore", "--quiet", "d/README"}).succeeded());
+    ASSERT_FALSE(repository_.tryGit({"switch", "topic"}).succeeded());
+    const Failure failure = inTheWay("untracked file 'd/README'");
+    expectSwitchRefused(failure);
+    expectMergeRefused(failure);
+    // Its patterns count for nothing once git does not read them from the index.
+    repository_.git({"update-index", "--no-skip-worktree", "d/.gitignore"});
+    repository_.git({"rm", "--quiet", "--cached", "d/.gitignore"});
+    repository_.commit("without");
+    merge("topic");
+    EXPECT_EQ(repository_.read("d/README"), "theirs\n");
+}
 
 /// Overwritten by a merge, as in git.
 class IgnoredFiles : public ObstacleFixture
