@@ -117,6 +117,7 @@ void GitAdapter::commit(const upath & /*folder*/, const ustring &message)
     else
     {
         refuseCommitWithAutostash(repository.get());
+        refuseCommitWithoutMergeHead(repository.get(), state);
     }
     if (expectedMerge_ == nullptr && headCommit != nullptr && mergeHeads.size() == 1)
     {

@@ -12,6 +12,7 @@
 #include "error/errorUtil/raiseGitError.hpp"
 #include "error/errorUtil/raiseSystemError.hpp"
 #include "util/repository/objectIds.hpp"
+#include "util/repository/repository.hpp"
 #include "util/scope/newFile.hpp"
 
 namespace vclink::git
@@ -26,6 +27,17 @@ void restoreMergeHead(git_repository *repository, const git_oid &theirs)
     if (error != 0 && error != EEXIST)
     {
         raiseSystemError(error, "could not write '" + path + "'");
+    }
+}
+
+void refuseCommitWithoutMergeHead(git_repository *repository, int state)
+{
+    if (state != GIT_REPOSITORY_STATE_MERGE && hasMergeHead(repository))
+    {
+        raiseGitError(GIT_ERROR, GIT_ERROR_REPOSITORY,
+                      "'git rebase' has stopped at a merge, and the commit would lack the history "
+                      "of the other side: conclude the merge with 'git commit', or the rebase with "
+                      "'git rebase --continue'");
     }
 }
 

@@ -17,6 +17,12 @@ namespace vclink::git
 /// @throws LibGit2Exception if this fails
 void restoreMergeHead(git_repository *repository, const git_oid &theirs);
 
+/// Refuses a commit that would remove MERGE_HEAD without having its parents: `git rebase` can stop
+/// at a merge, and libgit2 reports only the rebase then.
+/// @param state what readRepositoryState() has returned
+/// @throws LibGit2Exception
+void refuseCommitWithoutMergeHead(git_repository *repository, int state);
+
 /// Refuses a commit that would not belong to this merge, because another process has moved HEAD,
 /// committed the merge or aborted it.
 /// @param parents the parents of the commit

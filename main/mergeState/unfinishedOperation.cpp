@@ -8,7 +8,6 @@
 #include <git2/repository.h>
 #include <unistd.h>
 
-#include "error/errorUtil/GitResult.hpp"
 #include "error/errorUtil/raiseGitError.hpp"
 #include "util/repository/repository.hpp"
 #include "util/repository/workingTrees.hpp"
@@ -55,12 +54,7 @@ bool isNeeded(const WorkingTree &tree, const std::string &branch)
 
 void refuseSwitchInUnfinishedOperation(git_repository *repository)
 {
-    const int state = readRepositoryState(repository);
-    if (state < 0)
-    {
-        check(makeResult(state));
-    }
-    const char *const operation = describe(state);
+    const char *const operation = describe(readRepositoryState(repository));
     if (operation != nullptr)
     {
         raiseGitError(GIT_ECONFLICT, GIT_ERROR_CHECKOUT,

@@ -96,8 +96,6 @@ std::vector<Tolerance> tolerancesOfCommits(const std::string &operation, const s
         {"commitUnreadable", "git_commit_lookup", any, any, normal},
         {"commit", "git_reference_dwim", 1, any, isOtherTip},
         {"commit", "git_commit_lookup", 1, any, isOtherTip},
-        // A state that is none of a merge's is not looked at.
-        {"commit", "git_repository_state", any, any, normal},
         // There is no commit then, for all one knows, and the text is what making it has left:
         // none,
         // or that of a look for the branch. A fast-forward makes none, and looks for the one that
@@ -137,13 +135,8 @@ std::vector<Tolerance> tolerancesOfMerges(const std::string &operation, const st
                   "the merge was not committed, because another process has moved the current "
                   "branch or ended the merge meanwhile: see git status");
     const std::string hasConflicts = mergeFailure(textOf(shared_vclink::git::HasConflicts()));
-    const std::string badState =
-        mergeFailure(textOf(shared_vclink::git::UnableToMergeBadRepositoryState()));
     return {
-        // Any state but the normal one refuses the merge, any answer but no means conflicts.
-        {"merge", "git_repository_state", 1, any, badState},
-        {"merge", "git_repository_state", 2, any, badState},
-        {"merge", "git_repository_state", 3, any, isOtherMerge},
+        // Any answer but no means conflicts.
         {"merge", "git_index_has_conflicts", any, any, hasConflicts},
         // The first look-up chooses the words of the message, the second is the commit's, after
         // those of the look before the merge.

@@ -48,7 +48,6 @@ const std::set<std::string> functionsWithoutText{"git_checkout_options_init",
                                                  "git_proxy_options_init",
                                                  "git_push_options_init",
                                                  "git_remote_init_callbacks",
-                                                 "git_repository_state",
                                                  "git_status_options_init"};
 
 /// A function that fails without a text, and an operation that it stops.

@@ -52,9 +52,15 @@ bool isThere(const std::string &path)
     return false;
 }
 
-bool hasMergeHead(git_repository *repository)
+int readState(git_repository *repository)
 {
-    return isThere(git_repository_path(repository) + std::string("MERGE_HEAD"));
+    git_error_clear();
+    const int state = git_repository_state(repository);
+    if (state < 0)
+    {
+        check(makeResult(state));
+    }
+    return state;
 }
 
 /// Makes the folder the working tree. A linked working tree that was copied or moved still names
@@ -103,11 +109,15 @@ OwnedHandle<git_repository> openRepository(const upath &root)
 
 int readRepositoryState(git_repository *repository)
 {
-    const int state = git_repository_state(repository);
+    const int state = readState(repository);
     // Otherwise the commit that concludes a merge would lose the other side.
-    return state == GIT_REPOSITORY_STATE_NONE && hasMergeHead(repository)
-               ? git_repository_state(repository)
-               : state;
+    return state == GIT_REPOSITORY_STATE_NONE && hasMergeHead(repository) ? readState(repository)
+                                                                          : state;
+}
+
+bool hasMergeHead(git_repository *repository)
+{
+    return isThere(git_repository_path(repository) + std::string("MERGE_HEAD"));
 }
 
 void cleanUpRepositoryState(git_repository *repository)

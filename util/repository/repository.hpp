@@ -26,8 +26,12 @@ bool isRepository(const upath &path);
 [[nodiscard]] OwnedHandle<git_repository> openRepository(const upath &root);
 
 /// Returns the operation under way, a git_repository_state_t. git_repository_state, and again if it
-/// reports none and MERGE_HEAD exists. Throws if MERGE_HEAD cannot be examined.
+/// reports none and MERGE_HEAD exists. Throws if it fails, or if MERGE_HEAD cannot be examined.
 int readRepositoryState(git_repository *repository);
+
+/// Returns true if MERGE_HEAD exists. libgit2 reports a merge only if no rebase is under way.
+/// Throws if it cannot be examined.
+bool hasMergeHead(git_repository *repository);
 
 /// Calls git_repository_state_cleanup, and again if MERGE_HEAD still exists.
 void cleanUpRepositoryState(git_repository *repository);

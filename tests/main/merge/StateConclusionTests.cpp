@@ -156,12 +156,38 @@ TEST_F(StateConclusion, EndsABisection)
     EXPECT_FALSE(repository_.tryGit({"bisect", "log"}).succeeded());
 }
 
-/// A rebase comes first for libgit2, so that the merge in it is not seen.
-TEST_F(StateConclusion, EndsARebaseAndAMergeInItWithOneParent)
+/// A rebase comes first for libgit2, so that it does not report the merge in it.
+class MergeInARebase : public StateConclusion
 {
-    stopAt({"rebase", "theirs"});
-    repository_.write(".git/MERGE_HEAD", idOf("main") + '\n');
-    expectEnds({"rebase-merge", "MERGE_HEAD", "MERGE_MSG"});
+  protected:
+    /// A rebase of a merge that both sides have resolved by hand, stopped where git repeats it.
+    MergeInARebase()
+    {
+        repository_.git({"checkout", "--quiet", "-b", "onto", "main^"});
+        repository_.commitAll(writes("another", "onto\n"), "onto");
+        repository_.git({"checkout", "--quiet", "main"});
+        stopAt({"merge", "theirs"});
+        repository_.commitAll(writes("file", "resolved\n"), "merge");
+        stopAt({"rebase", "--rebase-merges", "onto"});
+        repository_.write("file", "resolved again\n");
+        repository_.add({"file"});
+    }
+};
+
+TEST_F(MergeInARebase, KeepsACommitFromLosingAParent)
+{
+    ASSERT_TRUE(exists("MERGE_HEAD"));
+    const Failure failure{
+        GIT_ERROR, GIT_ERROR_REPOSITORY,
+        "'git rebase' has stopped at a merge, and the commit would lack the history of the other "
+        "side: conclude the merge with 'git commit', or the rebase with 'git rebase --continue'"};
+    {
+        const NothingChanges nothing(repository_);
+        EXPECT_EQ(failureOf([this] { commit(); }), failure);
+    }
+    const std::vector<std::string> both{idOf("HEAD"), idOf("MERGE_HEAD")};
+    repository_.git({"commit", "--quiet", "--no-edit"});
+    EXPECT_EQ(parents(), both);
 }
 
 /// Only git would bring them back.
