@@ -3,6 +3,7 @@
 
 #include <algorithm>
 #include <cstdint>
+#include <limits>
 #include <memory>
 #include <thread>
 
@@ -43,7 +44,9 @@ milliseconds readReferenceLockTimeout(git_repository *repository)
     {
         return defaultTimeout;
     }
-    return value < 0 ? longestTimeout : milliseconds(value);
+    // git waits forever for a negative number, and fails for one that is no int.
+    const bool isLimited = value >= 0 && value <= std::numeric_limits<int>::max();
+    return isLimited ? milliseconds(value) : longestTimeout;
 }
 
 ReferenceLockWait::ReferenceLockWait(milliseconds timeout)

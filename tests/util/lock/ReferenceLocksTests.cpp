@@ -65,12 +65,26 @@ TEST_F(ReferenceLocks, AreWaitedForAsGitsConfigurationSays)
     EXPECT_EQ(timeout(), milliseconds(2'048));
     setTimeout("0");
     EXPECT_EQ(timeout(), milliseconds(0));
+    setTimeout("2147483647");
+    EXPECT_EQ(timeout(), milliseconds(2'147'483'647));
 }
 
 TEST_F(ReferenceLocks, AreWaitedForAMinuteWhereGitWouldWaitWithoutEnd)
 {
     setTimeout("-1");
     EXPECT_EQ(timeout(), milliseconds(60'000));
+}
+
+/// The last one would overflow in a smaller unit.
+TEST_F(ReferenceLocks, AreWaitedForAMinuteWhereGitRefusesTheNumberAsTooLarge)
+{
+    repository_.commit("first");
+    for (const auto *number : {"2147483648", "9000000000000", "9223372036854775807"})
+    {
+        setTimeout(number);
+        EXPECT_EQ(timeout(), milliseconds(60'000)) << number;
+        EXPECT_FALSE(repository_.tryGit({"branch", "topic"}).succeeded()) << number;
+    }
 }
 
 TEST_F(ReferenceLocks, AreWaitedForAsByDefaultWhereTheNumberIsNone)
