@@ -115,6 +115,11 @@ void removeFrom(git_config *config, const std::string &key, const Values &values
     }
 }
 
+[[noreturn]] void raiseUnreadable(const std::string &path)
+{
+    raiseGitError(GIT_ERROR, GIT_ERROR_CONFIG, "'" + path + "' cannot be read");
+}
+
 /// Returns null if there is no file. libgit2 takes one that it may not read for a missing one, and
 /// fails without a text.
 OwnedHandle<git_config> openFile(const std::string &path)
@@ -125,7 +130,7 @@ OwnedHandle<git_config> openFile(const std::string &path)
         {
             return nullptr;
         }
-        raiseGitError(GIT_ERROR, GIT_ERROR_CONFIG, "'" + path + "' cannot be read");
+        raiseUnreadable(path);
     }
     return acquire<git_config>(git_config_open_ondisk, path.c_str()).value();
 }
@@ -155,27 +160,38 @@ bool hasSettingBesideHeader(const std::string &line)
     return next != line.end() && *next != '#' && *next != ';';
 }
 
-/// Returns true if the value in this line goes on in the next one.
-bool goesOn(const std::string &line)
+/// Returns true if the value in this line goes on in the next one. A comment does not.
+/// @param isQuoted whether the line begins in quotes, and then whether the next one does
+bool goesOn(const std::string &line, bool &isQuoted)
 {
-    const auto first = std::find_if_not(line.begin(), line.end(), isSpace);
-    if (first == line.end() || *first == '#' || *first == ';')
+    const std::size_t size = line.size() - (!line.empty() && line.back() == '\r' ? 1 : 0);
+    for (std::size_t at = 0; at < size && (isQuoted || (line[at] != '#' && line[at] != ';')); ++at)
     {
-        return false;
+        isQuoted = isQuoted != (line[at] == '"');
+        if (line[at] == '\\' && ++at == size)
+        {
+            return true;
+        }
     }
-    const auto end = line.rbegin() + (line.back() == '\r' ? 1 : 0);
-    const auto other =
-        std::find_if_not(end, line.rend(), [](char letter) { return letter == '\\'; });
-    return (other - end) % 2 != 0;
+    isQuoted = false;
+    return false;
 }
 
-/// libgit2 would write such a setting twice, or keep the one that is to be removed.
-void refuseSettingsBesideHeadersIn(const std::string &path)
+/// Refuses a NUL, where libgit2 would cut off the file, and a setting beside a header, which
+/// libgit2 would write twice, or keep although it is to be removed.
+void refuseWhatLibGit2CannotWrite(const std::string &path)
 {
-    std::ifstream file(path);
+    std::ifstream file(path, std::ios_base::binary);
     bool isContinued = false;
-    for (std::string line; std::getline(file, line); isContinued = goesOn(line))
+    bool isQuoted = false;
+    for (std::string line; std::getline(file, line); isContinued = goesOn(line, isQuoted))
     {
+        if (line.find('\0') != std::string::npos)
+        {
+            raiseGitError(GIT_ERROR, GIT_ERROR_CONFIG,
+                          "'" + path +
+                              "' contains a NUL character: remove the branch with 'git branch'");
+        }
         // A value can go on with a line that begins like a header.
         if (!isContinued && hasSettingBesideHeader(line))
         {
@@ -185,18 +201,9 @@ void refuseSettingsBesideHeadersIn(const std::string &path)
                               "': remove the branch with 'git branch'");
         }
     }
-}
-
-/// libgit2 would cut off the file there.
-void refuseNulIn(const std::string &path)
-{
-    std::ifstream file(path, std::ios_base::binary);
-    if (std::find(std::istreambuf_iterator<char>(file), {}, '\0') !=
-        std::istreambuf_iterator<char>())
+    if (!file.eof())
     {
-        raiseGitError(GIT_ERROR, GIT_ERROR_CONFIG,
-                      "'" + path +
-                          "' contains a NUL character: remove the branch with 'git branch'");
+        raiseUnreadable(path);
     }
 }
 
@@ -211,8 +218,7 @@ BranchSettings::BranchSettings(git_repository *repository, const std::string &br
     {
         return;
     }
-    refuseNulIn(pathOfConfiguration(repository));
-    refuseSettingsBesideHeadersIn(pathOfConfiguration(repository));
+    refuseWhatLibGit2CannotWrite(pathOfConfiguration(repository));
     git_transaction *raw = nullptr;
     const GitResult<void> locked = call(git_config_lock, &raw, file_.get());
     lock_.reset(raw);

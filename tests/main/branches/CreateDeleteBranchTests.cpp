@@ -274,7 +274,10 @@ TEST_F(DeleteBranch, FailsIfASettingIsInTheLineOfAHeader)
     for (const std::string line :
          {"[branch \"topic\"] remote = o", "\t[branch \"topic\"]remote=o",
           "[branch \"topic\"]\n\tremote = o\n[remote \"a]\\\"b\"] url = u",
-          "[branch \"topic\"][user] name = x\n[branch \"topic\"]\n\tremote = o"})
+          "[branch \"topic\"][user] name = x\n[branch \"topic\"]\n\tremote = o",
+          // A backslash in a comment does not continue the line.
+          "[x]\n\ty = a # see c:\\\n[branch \"topic\"] remote = o\n\tmerge = m",
+          "[x]\n\ty = \"a;\" ; see c:\\\r\n[branch \"topic\"] remote = o\n\tmerge = m"})
     {
         repository_.write(".git/config", before + line + '\n');
         EXPECT_THAT(failureOfDelete("topic").text, HasSubstr("in the line of the header '"))
@@ -286,7 +289,9 @@ TEST_F(DeleteBranch, FailsIfASettingIsInTheLineOfAHeader)
     // The second of them is a part of a value, which begins like a header.
     for (const std::string line : {"[branch \"topic\"] # mine \\\n\tremote = o\n",
                                    "[branch \"topic\"]\n\tremote = o\n[alias]\n\tup = \"!f() { "
-                                   "\\\n[ -n x ] && git status; \\\n}; f\"\n"})
+                                   "\\\n[ -n x ] && git status; \\\n}; f\"\n",
+                                   "[branch \"topic\"]\n\tremote = o\n[alias]\n\tup = \"!f() { "
+                                   "\\\n true; # \\\n[ -n x ] && git status; }; f\"\n"})
     {
         repository_.git({"branch", "topic"});
         repository_.write(".git/config", before + line);
