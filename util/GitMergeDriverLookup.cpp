@@ -2,6 +2,7 @@
 #include "util/GitMergeDriverLookup.hpp"
 
 #include <memory>
+#include <stdexcept>
 #include <string>
 
 #include <git2/config.h>
@@ -72,7 +73,10 @@ int wildcardGitDriverApplyCallback(git_merge_driver * /*self*/, const char **pat
         writeRecord(SeverityStackTrace, "Merge driver ", key, " not found");
         return GIT_PASSTHROUGH;
     }
-    // A key without a value has a null pointer, for which std::string throws std::logic_error.
+    if (entry->value == nullptr)
+    {
+        throw std::logic_error("'" + key + "' has no value");
+    }
     const std::string command = entry->value;
     writeRecord(SeverityDiagnostic, entry->name, " ", command);
     return runExternalMerge(command, sides, repository, {pathOut, modeOut, mergedOut});

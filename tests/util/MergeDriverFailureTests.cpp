@@ -28,9 +28,21 @@ TEST_F(MergeDriverFailure, IsALogicErrorForAKeyWithoutAValue)
     makeConflict();
     const std::string config = repository_.read(".git/config");
     repository_.write(".git/config", config + "[merge \"tool\"]\n\tdriver\n");
-    EXPECT_THROW(mergeOrThrow(), std::logic_error);
+    const auto expectFailure = [this]
+    {
+        try
+        {
+            mergeOrThrow();
+            FAIL() << "no exception";
+        }
+        catch (const std::logic_error &error)
+        {
+            EXPECT_STREQ(error.what(), "'merge.tool.driver' has no value");
+        }
+    };
+    expectFailure();
     const LogCapture log;
-    EXPECT_THROW(mergeOrThrow(), std::logic_error);
+    expectFailure();
 }
 
 /// Whoever may write to the temporary folder could choose a file of the user's, for all to read.
