@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "vclink/git/GitException.hpp"
 
-#include <utility>
+#include <memory>
 
 #include "computils/exception/getStackTraceReport.hpp"
 #include "error/logging/logger.hpp"

@@ -8,7 +8,6 @@
 #include <memory>
 
 #include <git2/diff.h>
-#include <git2/errors.h>
 #include <git2/tree.h>
 
 #include "error/errorUtil/GitResult.hpp"

@@ -2,15 +2,12 @@
 #include "main/checkout/WorkingCopy.hpp"
 
 #include <algorithm>
-#include <cerrno>
 #include <cstddef>
 #include <cstring>
 #include <utility>
 
-#include <fcntl.h>
 #include <git2.h>
 #include <sys/stat.h>
-#include <unistd.h>
 
 #include "error/errorUtil/GitResult.hpp"
 #include "main/checkout/RemadeFiles.hpp"

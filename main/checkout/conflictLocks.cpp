@@ -4,11 +4,8 @@
 #include <algorithm>
 #include <cstddef>
 #include <iterator>
-#include <memory>
 #include <string>
-#include <utility>
 
-#include <git2/errors.h>
 #include <git2/index.h>
 #include <git2/merge.h>
 #include <git2/tree.h>

@@ -4,7 +4,6 @@
 #include <cstddef>
 
 #include <git2/tree.h>
-#include <sys/stat.h>
 
 #include "main/checkout/gitlinks.hpp"
 

@@ -7,7 +7,6 @@
 #include <git2/tree.h>
 
 #include "main/checkout/conflictLocks.hpp"
-#include "main/checkout/gitlinks.hpp"
 #include "main/checkout/treeChanges.hpp"
 
 namespace vclink::git

@@ -3,7 +3,6 @@
 
 #include <cstddef>
 
-#include <git2/errors.h>
 #include <git2/tree.h>
 
 #include "error/errorUtil/GitResult.hpp"

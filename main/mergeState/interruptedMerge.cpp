@@ -4,7 +4,6 @@
 #include <algorithm>
 #include <array>
 #include <cerrno>
-#include <cstddef>
 #include <memory>
 #include <string>
 #include <vector>

@@ -8,7 +8,6 @@
 #include <cstdlib>
 #include <iterator>
 #include <string>
-#include <string_view>
 #include <vector>
 
 #include <fcntl.h>

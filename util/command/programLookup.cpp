@@ -3,7 +3,6 @@
 
 #include <cerrno>
 #include <climits>
-#include <cstddef>
 #include <cstdlib>
 #include <vector>
 

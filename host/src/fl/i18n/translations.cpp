@@ -6,7 +6,6 @@
 #include <map>
 #include <mutex>
 #include <new>
-#include <string_view>
 #include <tuple>
 
 #include <boost/locale/gnu_gettext.hpp>
