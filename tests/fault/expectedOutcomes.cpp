@@ -135,8 +135,12 @@ std::vector<Tolerance> tolerancesOfMerges(const std::string &operation, const st
                   "the merge was not committed, because another process has moved the current "
                   "branch or ended the merge meanwhile: see git status");
     const std::string hasConflicts = mergeFailure(textOf(shared_vclink::git::HasConflicts()));
+    const std::string badState =
+        mergeFailure(textOf(shared_vclink::git::UnableToMergeBadRepositoryState()));
     return {
-        // Any answer but no means conflicts.
+        // Any state but the normal one refuses the merge, any answer but no means conflicts.
+        {"merge", "git_repository_state", 1, any, badState},
+        {"merge", "git_repository_state", 2, any, badState},
         {"merge", "git_index_has_conflicts", any, any, hasConflicts},
         // The first look-up chooses the words of the message, the second is the commit's, after
         // those of the look before the merge.

@@ -52,17 +52,6 @@ bool isThere(const std::string &path)
     return false;
 }
 
-int readState(git_repository *repository)
-{
-    git_error_clear();
-    const int state = git_repository_state(repository);
-    if (state < 0)
-    {
-        check(makeResult(state));
-    }
-    return state;
-}
-
 /// Makes the folder the working tree. A linked working tree that was copied or moved still names
 /// its old place, and core.worktree can name any folder: files there are not the host's.
 void useWorkingTree(git_repository *repository, const std::string &folder)
@@ -107,12 +96,24 @@ OwnedHandle<git_repository> openRepository(const upath &root)
     return repository;
 }
 
+int findRepositoryState(git_repository *repository)
+{
+    git_error_clear();
+    const int state = git_repository_state(repository);
+    // Otherwise the commit that concludes a merge would lose the other side.
+    return state == GIT_REPOSITORY_STATE_NONE && hasMergeHead(repository)
+               ? git_repository_state(repository)
+               : state;
+}
+
 int readRepositoryState(git_repository *repository)
 {
-    const int state = readState(repository);
-    // Otherwise the commit that concludes a merge would lose the other side.
-    return state == GIT_REPOSITORY_STATE_NONE && hasMergeHead(repository) ? readState(repository)
-                                                                          : state;
+    const int state = findRepositoryState(repository);
+    if (state < 0)
+    {
+        check(makeResult(state));
+    }
+    return state;
 }
 
 bool hasMergeHead(git_repository *repository)

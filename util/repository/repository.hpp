@@ -25,8 +25,12 @@ bool isRepository(const upath &path);
 /// @throws LibGit2Exception also if the working tree is another folder (core.worktree)
 [[nodiscard]] OwnedHandle<git_repository> openRepository(const upath &root);
 
-/// Returns the operation under way, a git_repository_state_t. git_repository_state, and again if it
-/// reports none and MERGE_HEAD exists. Throws if it fails, or if MERGE_HEAD cannot be examined.
+/// Returns the operation under way, a git_repository_state_t, or a negative number if libgit2
+/// cannot find it. git_repository_state, and again if it reports none and MERGE_HEAD exists. Throws
+/// if MERGE_HEAD cannot be examined.
+int findRepositoryState(git_repository *repository);
+
+/// Returns what findRepositoryState() does. Throws if that is negative.
 int readRepositoryState(git_repository *repository);
 
 /// Returns true if MERGE_HEAD exists. libgit2 reports a merge only if no rebase is under way.
