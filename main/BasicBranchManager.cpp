@@ -212,6 +212,7 @@ void BasicBranchManager::switchBranch(const BranchName &name)
     const OwnedHandle<git_reference> branch = lookupLocalBranch(repository.get(), shortName);
     const OwnedHandle<git_object> target = revparseObject(repository.get(), name).value();
     refuseOtherReference(branch.get(), target.get(), name);
+    refuseSwitchThroughLink(repository.get());
     refuseCheckedOutElsewhere(repository.get(), branch.get());
     refuseSwitchInUnfinishedOperation(repository.get());
     const CheckoutOptions options = optionsFactory_->makeCheckoutOptions();
@@ -266,6 +267,7 @@ void BasicBranchManager::deleteBranch(const BranchName &name)
         const OwnedHandle<git_reference> branch = lookupLocalBranch(repository.get(), shortName);
         id = targetOf(branch.get());
         const char *const reference = git_reference_name(branch.get());
+        refuseDeletionBehindLink(repository.get(), reference);
         refuseDeletionInUnfinishedOperation(repository.get(), reference);
         awaitUnlocked(repository.get(), reference);
         refuseUnremovableReflog(repository.get(), reference);

@@ -26,6 +26,14 @@ std::string readLine(const fs::path &path)
     return line;
 }
 
+/// What HEAD names: a symbolic link does with core.preferSymlinkRefs.
+std::string readHead(const fs::path &state)
+{
+    std::error_code noLink;
+    const std::string link = fs::read_symlink(state / "HEAD", noLink).string();
+    return link.rfind("refs/", 0) == 0 ? link : readLine(state / "HEAD");
+}
+
 /// The NAME of "ref: refs/heads/NAME", or of "refs/heads/NAME" as a rebase keeps it.
 std::string shortName(const std::string &line)
 {
@@ -61,9 +69,11 @@ void takeMoved(const State &state, std::vector<CheckedOutBranch> &branches)
 
 void take(const State &state, std::vector<CheckedOutBranch> &branches)
 {
-    for (const char *const file : {"HEAD", "rebase-merge/head-name", "rebase-apply/head-name"})
+    for (const std::string &line :
+         {readHead(state.folder), readLine(state.folder / "rebase-merge/head-name"),
+          readLine(state.folder / "rebase-apply/head-name")})
     {
-        const std::string name = shortName(readLine(state.folder / file));
+        const std::string name = shortName(line);
         if (!name.empty())
         {
             branches.push_back({name, state.root, state.isOwn, false});

@@ -229,6 +229,16 @@ TEST_F(ShellFetch, MovesNoBranchThatARebaseMoves)
     GitRepository(linked).git({"switch", "--quiet", "middle"});
 }
 
+/// git makes such a HEAD for core.preferSymlinkRefs.
+TEST_F(ShellFetch, MovesNoBranchOfAHeadThatIsALink)
+{
+    repository_.git(
+        {"-c", "core.preferSymlinkRefs=true", "symbolic-ref", "HEAD", "refs/heads/main"});
+    const std::vector<std::string> fetch{"fetch", "origin", "+refs/heads/new:refs/heads/main"};
+    EXPECT_NE(repository_.tryGit(fetch).exitStatus, 0);
+    EXPECT_THAT(refuse(fetch), HasSubstr("would move the branch 'main', which is checked out in"));
+}
+
 /// As git.
 TEST_F(ShellFetch, DeletesNoBranchThatIsCheckedOut)
 {

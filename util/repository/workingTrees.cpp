@@ -4,6 +4,8 @@
 #include <algorithm>
 #include <array>
 #include <cerrno>
+#include <climits>
+#include <cstddef>
 #include <memory>
 #include <utility>
 
@@ -11,7 +13,9 @@
 #include <git2/config.h>
 #include <git2/errors.h>
 #include <git2/repository.h>
+#include <unistd.h>
 
+#include "error/errorUtil/GitResult.hpp"
 #include "error/errorUtil/raiseGitError.hpp"
 #include "error/errorUtil/raiseSystemError.hpp"
 #include "util/path/isSameFolder.hpp"
@@ -58,6 +62,28 @@ std::string referenceIn(const std::string &head)
     const std::size_t name = head.find_first_not_of(" \t", begin.size());
     return head.rfind(begin, 0) == 0 && name != std::string::npos ? head.substr(name)
                                                                   : std::string();
+}
+
+/// Returns the text of a symbolic link; empty if there is none.
+std::string linkIn(const std::string &path)
+{
+    std::array<char, PATH_MAX> text{};
+    const ssize_t size = ::readlink(path.c_str(), text.data(), text.size());
+    // EINVAL means that it is no link.
+    if (size < 0 && errno != EINVAL && !isAbsent(errno))
+    {
+        raiseUnreadState(path, errno);
+    }
+    return size < 0 ? std::string() : std::string(text.data(), static_cast<std::size_t>(size));
+}
+
+[[noreturn]] void raiseLinkedHead(const std::string &action, const std::string &reference)
+{
+    raiseGitError(GIT_ERROR, GIT_ERROR_REFERENCE,
+                  "cannot " + action + " while HEAD is a symbolic link to '" + reference +
+                      "' (core.preferSymlinkRefs), which libgit2 would follow: make it a file with "
+                      "'git -c core.preferSymlinkRefs=false symbolic-ref HEAD " +
+                      reference + "'");
 }
 
 /// git ignores entries without this file's content.
@@ -123,7 +149,15 @@ WorkingTree::WorkingTree(std::string state, bool isBare) : state_(std::move(stat
 
 bool WorkingTree::isOn(const std::string &branch) const
 {
-    return referenceIn(firstLineOf(state_ + "HEAD")) == branch;
+    const std::string link = linkedHead();
+    return (link.empty() ? referenceIn(firstLineOf(state_ + "HEAD")) : link) == branch;
+}
+
+std::string WorkingTree::linkedHead() const
+{
+    // With another link git finds no repository.
+    const std::string link = linkIn(state_ + "HEAD");
+    return link.rfind("refs/", 0) == 0 ? link : std::string();
 }
 
 bool WorkingTree::hasCheckedOut(const std::string &branch) const
@@ -183,6 +217,23 @@ bool isCheckedOutElsewhere(git_repository *repository, const std::string &branch
     return std::any_of(others.begin(), others.end(),
                        [&branch](const WorkingTree &tree)
                        { return tree.hasCheckedOut(branch) || tree.returnsTo(branch); });
+}
+
+void refuseSwitchThroughLink(git_repository *repository)
+{
+    const std::string head = WorkingTree(git_repository_path(repository)).linkedHead();
+    if (!head.empty())
+    {
+        raiseLinkedHead("switch branches", head);
+    }
+}
+
+void refuseDeletionBehindLink(git_repository *repository, const std::string &branch)
+{
+    if (WorkingTree(git_repository_path(repository)).linkedHead() == branch)
+    {
+        raiseLinkedHead("delete '" + branch + "'", branch);
+    }
 }
 
 void raiseUsedElsewhere(const std::string &action, const std::string &branch)

@@ -22,6 +22,10 @@ class WorkingTree
 
     /// Returns true if HEAD names the branch. That of a bare repository does as well.
     bool isOn(const std::string &branch) const;
+    /// Returns the reference that HEAD names as a symbolic link, which git makes for
+    /// core.preferSymlinkRefs; empty if HEAD is a file. libgit2 follows the link: it takes HEAD for
+    /// detached, and writes to the branch instead of HEAD.
+    std::string linkedHead() const;
     bool hasCheckedOut(const std::string &branch) const;
     /// Returns true if a rebase or bisection returns to the branch in the end.
     bool returnsTo(const std::string &branch) const;
@@ -47,6 +51,16 @@ std::vector<WorkingTree> findOtherWorkingTrees(git_repository *repository);
 /// libgit2 does not know if it cannot open the main working tree, for example another user's.
 /// @throws LibGit2Exception if this cannot be found out
 bool isCheckedOutElsewhere(git_repository *repository, const std::string &branch);
+
+/// Refuses to switch branches while HEAD is a symbolic link: libgit2 would write the name of the
+/// new branch into the file of the old one, whose commits would then be on no branch.
+/// @throws LibGit2Exception
+void refuseSwitchThroughLink(git_repository *repository);
+
+/// Refuses to delete the branch that HEAD names as a symbolic link.
+/// @param branch the full name
+/// @throws LibGit2Exception
+void refuseDeletionBehindLink(git_repository *repository, const std::string &branch);
 
 /// Throws because another working tree has the branch checked out or needs it.
 /// @param action what cannot be done with it
