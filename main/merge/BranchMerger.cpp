@@ -133,7 +133,7 @@ void BranchMerger::awaitWritableBranch(git_repository *repository, const git_ref
 
 void BranchMerger::refuseOtherStates(git_repository *repository)
 {
-    if (findRepositoryState(repository) != GIT_REPOSITORY_STATE_NONE)
+    if (findRepositoryState(repository) != GIT_REPOSITORY_STATE_NONE || isInSeries(repository))
     {
         raise(shared_vclink::git::UnableToMergeBadRepositoryState());
     }

@@ -54,7 +54,11 @@ bool isNeeded(const WorkingTree &tree, const std::string &branch)
 
 void refuseSwitchInUnfinishedOperation(git_repository *repository)
 {
-    const char *const operation = describe(readRepositoryState(repository));
+    const char *operation = describe(readRepositoryState(repository));
+    if (operation == nullptr && isInSeries(repository))
+    {
+        operation = "a series of cherry-picks or reverts";
+    }
     if (operation != nullptr)
     {
         raiseGitError(GIT_ECONFLICT, GIT_ERROR_CHECKOUT,

@@ -6,6 +6,7 @@
 
 #include <git2.h>
 #include <sys/stat.h>
+#include <unistd.h>
 
 #include "error/errorUtil/gitString.hpp"
 #include "error/errorUtil/raiseGitError.hpp"
@@ -38,18 +39,23 @@ void readAgainIfEmpty(git_index *index)
 }
 
 /// libgit2 treats an unreadable file as a missing one.
-bool isThere(const std::string &path)
+bool isThere(const std::string &path, struct stat &status)
 {
-    struct stat status = {};
     if (::stat(path.c_str(), &status) == 0)
     {
         return true;
     }
-    if (errno != ENOENT)
+    if (errno != ENOENT && errno != ENOTDIR)
     {
         raiseSystemError(errno, "could not read '" + path + "'");
     }
     return false;
+}
+
+bool isThere(const std::string &path)
+{
+    struct stat status = {};
+    return isThere(path, status);
 }
 
 /// Makes the folder the working tree. A linked working tree that was copied or moved still names
@@ -68,6 +74,19 @@ void useWorkingTree(git_repository *repository, const std::string &folder)
                           "': open that one, or correct core.worktree");
     }
     check(git_repository_set_workdir, repository, folder.c_str(), 0);
+}
+
+/// Removes what git_repository_state_cleanup would, except for the series.
+void endMergeInSeries(git_repository *repository)
+{
+    for (const char *const name : {"MERGE_HEAD", "MERGE_MODE", "MERGE_MSG"})
+    {
+        const std::string path = git_repository_path(repository) + std::string(name);
+        if (::unlink(path.c_str()) != 0 && errno != ENOENT)
+        {
+            raiseSystemError(errno, "could not remove '" + path + "'");
+        }
+    }
 }
 
 } // namespace
@@ -121,8 +140,24 @@ bool hasMergeHead(git_repository *repository)
     return isThere(git_repository_path(repository) + std::string("MERGE_HEAD"));
 }
 
+bool isInSeries(git_repository *repository)
+{
+    struct stat status = {};
+    return isThere(git_repository_path(repository) + std::string("sequencer/todo"), status) &&
+           status.st_size != 0;
+}
+
 void cleanUpRepositoryState(git_repository *repository)
 {
+    if (isInSeries(repository))
+    {
+        const int state = readRepositoryState(repository);
+        if (state == GIT_REPOSITORY_STATE_NONE || state == GIT_REPOSITORY_STATE_MERGE)
+        {
+            endMergeInSeries(repository);
+            return;
+        }
+    }
     check(git_repository_state_cleanup, repository);
     // Otherwise the next commit would be part of the same merge.
     if (hasMergeHead(repository))

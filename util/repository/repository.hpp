@@ -37,7 +37,13 @@ int readRepositoryState(git_repository *repository);
 /// Throws if it cannot be examined.
 bool hasMergeHead(git_repository *repository);
 
-/// Calls git_repository_state_cleanup, and again if MERGE_HEAD still exists.
+/// Returns true if git has commits left to cherry-pick or revert. Between two of them, for example
+/// after the user has committed one that was in conflict, git_repository_state reports that nothing
+/// is under way. Throws if this cannot be found out.
+bool isInSeries(git_repository *repository);
+
+/// Ends what a commit concludes. git_repository_state_cleanup, and again if MERGE_HEAD still
+/// exists; as git does, keeps the rest of a series that the commit is not part of.
 void cleanUpRepositoryState(git_repository *repository);
 
 /// Returns true if the repository lacks the older part of its history. git_repository_is_shallow

@@ -132,9 +132,9 @@ class VCLINK_GIT_EXPORT BranchManager
     virtual void merge(BranchName name) = 0;
 
     /// Returns the repository's state in words: "Normal", "Conflicts" while a merge, revert or
-    /// cherry-pick is under way, "Bisecting", "Rebase", "Rebase interactive", "Rebase w/merge",
-    /// "Apply mailbox", "Rebase/Apply mailbox". Throws only if the repository cannot be opened.
-    /// git_repository_state.
+    /// cherry-pick is under way (not between two steps of a series of them), "Bisecting", "Rebase",
+    /// "Rebase interactive", "Rebase w/merge", "Apply mailbox", "Rebase/Apply mailbox". Throws only
+    /// if the repository cannot be opened. git_repository_state.
     virtual std::string getRepositoryState() const = 0;
 };
 

@@ -74,6 +74,8 @@ namespace vclink::git
 /// shared_vclink::git::NoUserName if there is neither, and boost::system::system_error if the
 /// machine's name cannot be found out.
 ///
+/// Between two steps of a series of cherry-picks or reverts, keeps the rest of the series.
+///
 /// A file that a sparse checkout leaves out stays as in the index; a file that cannot be read makes
 /// the commit fail. If another process has locked the branch, the commit tries again for
 /// `core.filesRefLockTimeout` milliseconds, 100 by default.

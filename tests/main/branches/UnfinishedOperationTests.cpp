@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "main/mergeState/unfinishedOperation.hpp"
 
+#include <filesystem>
 #include <functional>
 #include <string>
 
@@ -8,7 +9,10 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include "fl/i18n/convert.hpp"
 #include "main/merge/MergeFixture.hpp"
+#include "vclink/CMAdapter.hpp"
+#include "vclink/git/messageIdentifiers.hpp"
 
 namespace
 {
@@ -35,6 +39,17 @@ std::function<void(const GitRepository &)> stopping(const std::vector<std::strin
     { EXPECT_FALSE(repository.tryGit(arguments).succeeded()); };
 }
 
+/// The user commits the step that is in conflict. The others are not done yet.
+std::function<void(const GitRepository &)> committing(const std::vector<std::string> &arguments)
+{
+    return [arguments](const GitRepository &repository)
+    {
+        stopping(arguments)(repository);
+        repository.write("file", "resolved\n");
+        repository.git({"commit", "--quiet", "--all", "--message=resolved"});
+    };
+}
+
 const UnfinishedOperation unfinishedOperations[]{
     {"merge", "a merge", stopping({"merge", "topic"})},
     {"mergeWithoutConflict", "a merge",
@@ -44,6 +59,10 @@ const UnfinishedOperation unfinishedOperations[]{
     {"cherryPick", "a cherry-pick", stopping({"cherry-pick", "topic"})},
     {"severalCherryPicks", "a cherry-pick", stopping({"cherry-pick", "aside", "topic"})},
     {"revert", "a revert", stopping({"revert", "--no-edit", "HEAD~1"})},
+    {"restOfCherryPicks", "a series of cherry-picks or reverts",
+     committing({"cherry-pick", "topic", "aside"})},
+    {"restOfReverts", "a series of cherry-picks or reverts",
+     committing({"revert", "--no-edit", "HEAD~1", "HEAD"})},
     {"rebase", "a rebase", stopping({"rebase", "topic"})},
     {"rebaseWithPatches", "a rebase", stopping({"rebase", "--apply", "topic"})},
     {"editInARebase", "a rebase",
@@ -87,6 +106,91 @@ TEST_P(Unfinished, RefusesASwitchAndChangesNothing)
 
 INSTANTIATE_TEST_SUITE_P(Operations, Unfinished, testing::ValuesIn(unfinishedOperations),
                          testing::PrintToStringParamName());
+
+/// A cherry-pick of "topic" and "aside" in which the user has committed "topic".
+class UnfinishedSeries : public Unfinished
+{
+  protected:
+    UnfinishedSeries()
+    {
+        committing({"cherry-pick", "topic", "aside"})(repository_);
+    }
+
+    void commit(const std::string &message) const
+    {
+        static_cast<vclink::CMAdapter &>(*adapter_).commit({}, fl::i18n::utf8_to_ustring(message));
+    }
+    /// Expects git to do the rest on top of the commit that is HEAD's now.
+    void expectRest() const
+    {
+        const std::string head = idOf("HEAD");
+        // The user has picked "topic".
+        repository_.git({"-c", "core.editor=true", "cherry-pick", "--continue"});
+        EXPECT_EQ(idOf("HEAD^"), head);
+        EXPECT_EQ(repository_.read("aside"), "x");
+        EXPECT_FALSE(std::filesystem::exists(repository_ / ".git/sequencer"));
+    }
+};
+
+TEST_F(UnfinishedSeries, RefusesASwitchAsGit)
+{
+    EXPECT_FALSE(makeTwin().tryGit({"switch", "other-branch"}).succeeded());
+    EXPECT_EQ(failureOf([this] { branches().switchBranch("other-branch"); }).code, GIT_ECONFLICT);
+    EXPECT_EQ(branches().getRepositoryState(), "Normal");
+    expectRest();
+}
+
+TEST_F(UnfinishedSeries, RefusesAMergeAndAFastForward)
+{
+    makeBranch("ahead", writes("ahead", "x"), "HEAD");
+    for (const auto *const branch : {"other-branch", "ahead"})
+    {
+        const NothingChanges nothing(repository_);
+        EXPECT_EQ(failureOfMerge(branch),
+                  textOf(shared_vclink::git::UnableToMergeBadRepositoryState()));
+    }
+    expectRest();
+}
+
+TEST_F(UnfinishedSeries, IsKeptByACommit)
+{
+    repository_.write("other", "edited\n");
+    repository_.write(".git/MERGE_MSG", "of git's last command\n");
+    const GitRepository twin = makeTwin();
+    twin.git({"-c", "core.editor=true", "commit", "--quiet", "--all"});
+    EXPECT_FALSE(std::filesystem::exists(twin / ".git/MERGE_MSG"));
+    commit("edited");
+    EXPECT_FALSE(std::filesystem::exists(repository_ / ".git/MERGE_MSG"));
+    EXPECT_EQ(repository_.read(".git/sequencer/todo"), twin.read(".git/sequencer/todo"));
+    expectRest();
+}
+
+/// git begins a merge between two steps.
+TEST_F(UnfinishedSeries, IsKeptByTheCommitOfAMerge)
+{
+    repository_.git({"merge", "--quiet", "--no-commit", "other-branch"});
+    commit("merged");
+    EXPECT_EQ(idOf("HEAD^2"), idOf("other-branch"));
+    EXPECT_FALSE(std::filesystem::exists(repository_ / ".git/MERGE_HEAD"));
+    EXPECT_FALSE(std::filesystem::exists(repository_ / ".git/MERGE_MODE"));
+    expectRest();
+}
+
+/// git takes no notice of such a file.
+TEST_F(Unfinished, IsNoSeriesWithoutSteps)
+{
+    repository_.write(".git/sequencer/todo", "");
+    EXPECT_TRUE(makeTwin().tryGit({"switch", "other-branch"}).succeeded());
+    branches().switchBranch("other-branch");
+    EXPECT_EQ(branches().getCurrentBranch().getName(), "other-branch");
+}
+
+TEST_F(Unfinished, IsNoFileInThePlaceOfASeries)
+{
+    repository_.write(".git/sequencer", "");
+    branches().switchBranch("other-branch");
+    EXPECT_EQ(branches().getCurrentBranch().getName(), "other-branch");
+}
 
 using UnfinishedBisection = Unfinished;
 
