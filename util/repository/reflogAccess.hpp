@@ -6,8 +6,9 @@
 namespace vclink::git
 {
 
-/// Refuses a reflog that exists and cannot be appended to, for example because root has made it.
-/// libgit2 appends to it when it moves the reference, which is after the files were written.
+/// Refuses a reflog that can neither be appended to nor made: root has made it, or something else
+/// is in its place or in the place of a folder above. libgit2 appends to it when it moves the
+/// reference, which is after the files were written.
 /// @param reference the full name
 /// @throws LibGit2Exception
 void refuseUnwritableReflog(git_repository *repository, const char *reference);
