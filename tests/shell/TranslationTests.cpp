@@ -59,6 +59,8 @@ bool isForPrograms(const std::string &text)
         "Rebase/Apply mailbox", "Enumerating objects:", "Counting objects:", "Compressing objects:",
         "Resolving deltas:", "Unpacking objects:", "Checking connectivity", " is required",
         "At Most",
+        // of the library's refusals
+        "is not in this partial clone",
         // of libgit2
         "unsupported repository ", "unsupported extension ",
         // a failure of the system

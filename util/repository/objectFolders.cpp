@@ -5,6 +5,7 @@
 #include <cstddef>
 
 #include <git2/repository.h>
+#include <unistd.h>
 
 #include "util/repository/linesOf.hpp"
 
@@ -13,11 +14,17 @@ namespace vclink::git
 namespace
 {
 
-/// Returns the folders that a folder of objects names.
+/// Returns the folders from which a folder of objects borrows.
 std::vector<std::string> alternatesOf(const std::string &objects)
 {
     std::vector<std::string> folders;
-    for (const std::string &line : linesOf(objects + "/info/alternates"))
+    const std::string list = objects + "/info/alternates";
+    // As libgit2, which fails if the list is there and cannot be read.
+    if (::access(list.c_str(), F_OK) != 0)
+    {
+        return folders;
+    }
+    for (const std::string &line : linesOf(list))
     {
         if (!line.empty() && line.front() != '#')
         {

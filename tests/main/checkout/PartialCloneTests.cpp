@@ -122,6 +122,17 @@ TEST_F(PartialClone, IsLeftByASwitchIfItBorrowsFromARepositoryThatBorrows)
     expectSwitchRefused(lacking("file"));
 }
 
+/// For git and libgit2, that one borrows nothing then.
+TEST_F(PartialClone, IsRecognisedIfItBorrowsFromAnotherUsersRepository)
+{
+    repository_.write(".git/objects/info/alternates", "../lender\n");
+    repository_.write(".git/lender/info/alternates", "/nowhere\n");
+    EXPECT_EQ(runUnprivileged(
+                  ".git/lender/info", 0,
+                  [this] { return failureOf([this] { branches().switchBranch("topic"); }).text; }),
+              lacking("d/f").text);
+}
+
 /// git leaves the files out.
 TEST_F(PartialClone, IsLeftByASwitchOfARepositoryThatBorrowsFromIt)
 {
