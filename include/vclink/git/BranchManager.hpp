@@ -75,7 +75,7 @@ class VCLINK_GIT_EXPORT BranchManager
     /// Also refuses while a merge, revert, cherry-pick, rebase or `git am` is under way, and, with
     /// other codes, if another working tree of the repository has the branch checked out
     /// (GIT_ERROR), if HEAD is a symbolic link or cannot be written (GIT_ERROR), or if it moves
-    /// meanwhile (GIT_EMODIFIED).
+    /// during the switch (GIT_EMODIFIED).
     /// Throws with GIT_EAMBIGUOUS if a tag has the name of the branch and another commit, and for
     /// the branch "stash" if there is a stash.
     ///
