@@ -180,17 +180,9 @@ std::vector<Tolerance> tolerancesOfRemotes(const std::string &normal)
     };
 }
 
-std::vector<Tolerance> tolerancesOfOthers(const std::string &operation, const std::string &normal)
+std::vector<Tolerance> tolerancesOfLists(const std::string &normal)
 {
     return {
-        // Only a missing folder is no failure of a probe.
-        {"isAdapterFor", "git_repository_open_ext", any, GIT_ENOTFOUND, "done: 0"},
-        // Any answer but no means that the file is listed.
-        {"", "git_pathspec_matches_path", any, any, normal},
-        // Without a HEAD the files are taken out of the index.
-        {"revert", "git_revparse_single", any, any, normal},
-        // The look for conflicts finds none.
-        {"revert", "git_index_has_conflicts", any, any, normal},
         // The end of a list.
         {"getLocalBranches", "git_branch_next", 1, GIT_ITEROVER, "done: "},
         {"getLocalBranches", "git_branch_next", 2, GIT_ITEROVER, "done: refs/heads/main "},
@@ -202,6 +194,20 @@ std::vector<Tolerance> tolerancesOfOthers(const std::string &operation, const st
         {"listBesideBrokenLink", "git_branch_lookup", 3, any, "done: refs/heads/main "},
         {"getRemoteBranches", "git_branch_next", 1, GIT_ITEROVER, "done: "},
         {"getRemoteBranches", "git_branch_next", 2, GIT_ITEROVER, normal},
+    };
+}
+
+std::vector<Tolerance> tolerancesOfOthers(const std::string &operation, const std::string &normal)
+{
+    return {
+        // Only a missing folder is no failure of a probe.
+        {"isAdapterFor", "git_repository_open_ext", any, GIT_ENOTFOUND, "done: 0"},
+        // Any answer but no means that the file is listed.
+        {"", "git_pathspec_matches_path", any, any, normal},
+        // Without a HEAD the files are taken out of the index.
+        {"revert", "git_revparse_single", any, any, normal},
+        // The look for conflicts finds none.
+        {"revert", "git_index_has_conflicts", any, any, normal},
         {"merge", "git_index_conflict_next", any, GIT_ITEROVER, normal},
         // Nothing in the index below a name.
         {"", "git_index_find_prefix", any, GIT_ENOTFOUND, normal},
@@ -253,6 +259,8 @@ std::vector<Tolerance> tolerancesOf(const std::string &operation, const std::str
     all.insert(all.end(), merges.begin(), merges.end());
     const std::vector<Tolerance> remotes = tolerancesOfRemotes(normal);
     all.insert(all.end(), remotes.begin(), remotes.end());
+    const std::vector<Tolerance> lists = tolerancesOfLists(normal);
+    all.insert(all.end(), lists.begin(), lists.end());
     const std::vector<Tolerance> others = tolerancesOfOthers(operation, normal);
     all.insert(all.end(), others.begin(), others.end());
     return all;
