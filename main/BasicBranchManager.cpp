@@ -26,6 +26,7 @@
 #include "util/lock/PackedReferences.hpp"
 #include "util/lock/referenceLocks.hpp"
 #include "util/repository/brokenLinks.hpp"
+#include "util/repository/fatalPatterns.hpp"
 #include "util/repository/objectIds.hpp"
 #include "util/repository/reflogAccess.hpp"
 #include "util/repository/repository.hpp"
@@ -215,6 +216,7 @@ void BasicBranchManager::switchBranch(const BranchName &name)
     refuseSwitchThroughLink(repository.get());
     refuseCheckedOutElsewhere(repository.get(), branch.get());
     refuseSwitchInUnfinishedOperation(repository.get());
+    refuseFatalPatterns(repository.get());
     const CheckoutOptions options = optionsFactory_->makeCheckoutOptions();
     git_checkout_options record = toGitCheckoutOptions(options, callbacks_->checkoutCallbacks());
     CheckoutWatch watch(CheckoutKind::Switch, repository.get(), record);

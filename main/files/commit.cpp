@@ -85,7 +85,7 @@ GitResult<OwnedHandle<git_object>> lookUpWritten(git_repository *repository, con
 
 void GitAdapter::commit(const upath & /*folder*/, const ustring &message)
 {
-    const OwnedHandle<git_repository> repository = openRepository(root_);
+    const OwnedHandle<git_repository> repository = openWorkingCopy(root_);
     // From here no other process commits, merges or ends a merge in this working copy.
     IndexLock lock = lockIndex(repository.get(), expectedMerge_ != nullptr);
     // If HEAD has no commit, for any reason, the new commit is a root commit.

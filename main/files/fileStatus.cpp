@@ -54,7 +54,7 @@ FileStateMap GitAdapter::collectFileStates(char **pathspecStrings, std::size_t p
     StatusCallbacks callbacks(root_);
     git_status_options record = toGitStatusOptions(options);
     record.pathspec = {pathspecStrings, pathspecCount};
-    const OwnedHandle<git_repository> repository = openRepository(root_);
+    const OwnedHandle<git_repository> repository = openWorkingCopy(root_);
     // Intentionally ignored: the caller gets the states up to the failure of the walk.
     static_cast<void>(call(git_status_foreach_ext, repository.get(), &record,
                            makeCallback<&StatusCallbacks::status, git_status_cb>(), &callbacks));

@@ -160,7 +160,7 @@ void GitAdapter::revertFiles(const std::vector<upath> &files)
         return;
     }
     const PathspecArray pathspec = makeFilePathspec(files, root_);
-    const OwnedHandle<git_repository> repository = openRepository(root_);
+    const OwnedHandle<git_repository> repository = openWorkingCopy(root_);
     IndexLock lock(repository.get());
     // Without a HEAD the reset removes the paths from the index.
     const GitResult<OwnedHandle<git_object>> head = revparseObject(repository.get(), "HEAD");

@@ -98,7 +98,7 @@ void GitAdapter::addToIndex(const std::vector<upath> &files)
         return;
     }
     refuseNuls(files);
-    const OwnedHandle<git_repository> repository = openRepository(root_);
+    const OwnedHandle<git_repository> repository = openWorkingCopy(root_);
     IndexLock lock(repository.get());
     const OwnedHandle<git_index> index = getRepositoryIndex(repository.get());
     const PathspecArray pathspec = makeFilePathspec(files, root_);
@@ -120,7 +120,7 @@ void GitAdapter::removeFromIndex(const std::vector<upath> &files, LeftOutFiles l
         return;
     }
     refuseNuls(files);
-    const OwnedHandle<git_repository> repository = openRepository(root_);
+    const OwnedHandle<git_repository> repository = openWorkingCopy(root_);
     IndexLock lock(repository.get());
     const OwnedHandle<git_index> index = getRepositoryIndex(repository.get());
     const PathspecArray pathspec = makeFilePathspec(files, root_);

@@ -25,6 +25,7 @@
 #include "util/lock/IndexLock.hpp"
 #include "util/lock/referenceLocks.hpp"
 #include "util/repository/Head.hpp"
+#include "util/repository/fatalPatterns.hpp"
 #include "util/repository/reflogAccess.hpp"
 #include "util/repository/repository.hpp"
 #include "vclink/git/messageIdentifiers.hpp"
@@ -90,6 +91,7 @@ void BranchMerger::performMerge(const BranchName &name)
 void BranchMerger::decide(const BranchName &name, git_repository *repository)
 {
     refuseOtherStates(repository);
+    refuseFatalPatterns(repository);
     const git_oid *const id = revparseId(name, repository);
     const OwnedHandle<git_annotated_commit> theirs =
         acquire<git_annotated_commit>(git_annotated_commit_lookup, repository, id).value();

@@ -12,6 +12,7 @@
 #include "error/errorUtil/raiseGitError.hpp"
 #include "error/errorUtil/raiseSystemError.hpp"
 #include "util/path/isSameFolder.hpp"
+#include "util/repository/fatalPatterns.hpp"
 
 namespace vclink::git
 {
@@ -112,6 +113,13 @@ OwnedHandle<git_repository> openRepository(const upath &root)
                                 GIT_REPOSITORY_OPEN_NO_SEARCH, nullptr)
             .value();
     useWorkingTree(repository.get(), folder);
+    return repository;
+}
+
+OwnedHandle<git_repository> openWorkingCopy(const upath &root)
+{
+    OwnedHandle<git_repository> repository = openRepository(root);
+    refuseFatalPatterns(repository.get());
     return repository;
 }
 

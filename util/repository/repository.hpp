@@ -25,6 +25,10 @@ bool isRepository(const upath &path);
 /// @throws LibGit2Exception also if the working tree is another folder (core.worktree)
 [[nodiscard]] OwnedHandle<git_repository> openRepository(const upath &root);
 
+/// The same for operations that look for untracked or ignored files. Also calls
+/// refuseFatalPatterns().
+[[nodiscard]] OwnedHandle<git_repository> openWorkingCopy(const upath &root);
+
 /// Returns the operation under way, a git_repository_state_t, or a negative number if libgit2
 /// cannot find it. git_repository_state, and again if it reports none and MERGE_HEAD exists. Throws
 /// if MERGE_HEAD cannot be examined.

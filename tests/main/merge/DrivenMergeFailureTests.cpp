@@ -195,11 +195,11 @@ TEST_F(DrivenMergeFailure, OfAHostThatIgnoresItsChildrenStartsNoCommand)
     expectTheNextToSucceed();
 }
 
-TEST_F(DrivenMergeFailure, OfAKeyWithoutAValueIsTheStringsOwn)
+TEST_F(DrivenMergeFailure, OfAKeyWithoutAValueNamesTheKey)
 {
     const std::string config = repository_.read(".git/config");
     repository_.write(".git/config", config + "[merge \"tool\"]\n\tdriver\n");
-    EXPECT_THAT(failure(), HasSubstr("null"));
+    EXPECT_THAT(failure(), HasSubstr("'merge.tool.driver' has no value"));
     repository_.write(".git/config", config);
     expectTheNextToSucceed();
 }

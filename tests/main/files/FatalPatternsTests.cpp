@@ -1,0 +1,124 @@
+// SPDX-License-Identifier: MIT
+#include "util/repository/fatalPatterns.hpp"
+
+#include <array>
+#include <chrono>
+#include <csignal>
+#include <cstddef>
+#include <functional>
+#include <random>
+#include <string>
+#include <vector>
+
+#include <git2.h>
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include "CommitFixture.hpp"
+#include "support/ChildProcess.hpp"
+#include "vclink/git/BranchManager.hpp"
+#include "vclink/git/GitException.hpp"
+
+namespace
+{
+
+using testing::HasSubstr;
+using vclink::git::findFatalPattern;
+using vclink::git::PatternFault;
+using namespace vclink::test;
+
+class FatalPatterns : public CommitFixture
+{
+  protected:
+    /// Whether libgit2 comes to an end with these patterns.
+    bool isFatal(const std::string &patterns, std::chrono::milliseconds timeout) const
+    {
+        repository_.write(".gitignore", patterns);
+        const std::string end = runInChild(
+            [this]
+            {
+                std::signal(SIGSEGV, SIG_DFL);
+                git_repository *repository = nullptr;
+                int isIgnored = 0;
+                git_repository_open(&repository, repository_.path().c_str());
+                git_ignore_path_is_ignored(&isIgnored, repository, "name");
+                git_repository_free(repository);
+                return std::string();
+            },
+            timeout);
+        return !end.empty();
+    }
+
+    void expectRefused(const std::function<void()> &action) const
+    {
+        const Failure failure = failureOf(action);
+        EXPECT_EQ(failure.code, GIT_ERROR);
+        EXPECT_EQ(failure.errorClass, GIT_ERROR_REPOSITORY);
+        EXPECT_THAT(failure.text, HasSubstr("line 2 of '" + repository_.path().string()));
+    }
+};
+
+TEST_F(FatalPatterns, AreThoseAtWhichLibGit2EndsTheProcess)
+{
+    constexpr std::array<const char *, 10> pieces{"!",  "!", "/",  "/", "\\",
+                                                  "\r", " ", "\t", "a", "\n"};
+    std::mt19937 random(1);
+    int fatal = 0;
+    for (int i = 0; i < 150; ++i)
+    {
+        std::string text = i % 5 == 0 ? "a\n!" : "x*\n!";
+        for (std::size_t size = random() % 5; size > 0; --size)
+            text += pieces.at(random() % pieces.size());
+        const bool isFound = findFatalPattern(text).fault == PatternFault::EndsProcess;
+        EXPECT_EQ(isFound, isFatal(text, std::chrono::seconds(30))) << testing::PrintToString(text);
+        fatal += isFound ? 1 : 0;
+    }
+    EXPECT_GT(fatal, 5);
+    for (const std::string text : {"x*\n!//\n", "x*\n!\\\r\n", "\xEF\xBB\xBFx*\n! //\n!/\\"})
+        EXPECT_EQ(findFatalPattern(text).fault, PatternFault::EndsProcess);
+}
+
+TEST_F(FatalPatterns, AreThoseAtWhichLibGit2NeverEnds)
+{
+    for (const std::string text : {"\f", "a\n\v\n", "!\f", "/\fa", " \f", "\r\f"})
+    {
+        EXPECT_EQ(findFatalPattern(text).fault, PatternFault::NeverEnds);
+        EXPECT_TRUE(isFatal(text, std::chrono::milliseconds(300))) << testing::PrintToString(text);
+    }
+    for (const std::string text : {"a\fb", "\\\f", "#\f", "a\n#b\v\n", "\\\n \v", ""})
+    {
+        EXPECT_EQ(findFatalPattern(text).fault, PatternFault::None);
+        EXPECT_FALSE(isFatal(text, std::chrono::seconds(30))) << testing::PrintToString(text);
+    }
+}
+
+TEST_F(FatalPatterns, StopEachOperationThatReadsThem)
+{
+    repository_.makeBranch("topic", writes("file", "of topic\n"));
+    repository_.write("file", "edited\n");
+    repository_.write("new", "x");
+    for (const std::string name : {".gitignore", ".git/info/exclude"})
+    {
+        for (const std::string line : {"!//", "\f"})
+        {
+            repository_.write(name, "*.o\n" + line + "\n");
+            SCOPED_TRACE(name);
+            const auto adapter = makeAdapter(repository_.path());
+            const auto branches = vclink::git::BranchManager::create(*adapter);
+            expectRefused([&] { adapter->getFolderStates(asPath(repository_.path())); });
+            expectRefused([this] { add({"new"}); });
+            expectRefused([this] { remove({"file"}); });
+            expectRefused([this] { markResolved("file"); });
+            expectRefused([this] { revert({"file"}); });
+            expectRefused([this] { commit(); });
+            expectRefused([&] { branches->switchBranch("topic"); });
+            EXPECT_THROW(branches->merge("topic"), vclink::git::GitException);
+            EXPECT_EQ(repository_.read("file"), "edited\n");
+            repository_.write(name, "*.o\n");
+        }
+    }
+    add({"new"});
+    EXPECT_THAT(status(), testing::Contains("A  new"));
+}
+
+} // namespace
