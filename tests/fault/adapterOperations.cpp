@@ -120,6 +120,7 @@ std::vector<Operation> adapterOperations()
         {"createAdapterFor", makePlain, createAdapterFor, "", {}, false},
         {"getFileStates", makeChanged, getFileStates, "", {}, false},
         {"getFolderStates", makeChanged, getFolderStates, "", {}, false},
+        {"getFolderStatesOfMovedTree", makeMovedTree, getFolderStates, "", {}, false},
         {"addFiles", makeChanged, onFiles(&Adapter::addFiles, {"new"}), alreadyAdded, unstage},
         {"addFilesBesideEmptied", makeEmptied, onFiles(&Adapter::addFiles, {"new"}), alreadyAdded,
          unstage},

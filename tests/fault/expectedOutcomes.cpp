@@ -233,6 +233,7 @@ std::vector<Tolerance> tolerancesOfOthers(const std::string &operation, const st
         {"merge", "git_merge_bases", any, GIT_ENOTFOUND, normal},
         // Only no is an answer.
         {"switchBranchInPartialClone", "git_odb_exists", any, any, normal},
+        {"getFolderStatesOfMovedTree", "git_repository_is_worktree", any, any, normal},
         // A state without a name.
         {"getRepositoryState", "git_repository_state", any, any, "done: "},
         // The library ends the comparison itself as soon as it has seen something of that.

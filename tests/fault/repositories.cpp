@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: MIT
 #include "repositories.hpp"
 
+#include <filesystem>
+
 #include "support/Change.hpp"
 
 namespace vclink::test
@@ -126,6 +128,18 @@ void makeLinkedTree(GitRepository &repository)
     const std::string linked = repository.path().parent_path() / "linked";
     repository.git({"worktree", "add", "--quiet", "-b", "elsewhere", linked});
     repository.git({"-C", linked, "bisect", "start"});
+}
+
+void makeMovedTree(GitRepository &repository)
+{
+    const std::filesystem::path root = repository.path();
+    const std::filesystem::path old = root.parent_path() / "old";
+    auto main = GitRepository::init(root.parent_path() / "main");
+    makePlain(main);
+    main.git({"worktree", "add", "--quiet", "-b", "own", old.string()});
+    std::filesystem::remove_all(root);
+    std::filesystem::rename(old, root);
+    repository.write("file", "changed\n");
 }
 
 void makeSettings(GitRepository &repository)

@@ -34,6 +34,8 @@ void makeBranches(GitRepository &repository);
 void makeSettings(GitRepository &repository);
 /// Branches, and a linked working tree with a branch of its own, in a bisection.
 void makeLinkedTree(GitRepository &repository);
+/// A linked working tree that was moved, with "file" modified.
+void makeMovedTree(GitRepository &repository);
 /// Branches, with an untracked link in the place of "sub", which both branches have.
 void makeLinkedFolder(GitRepository &repository);
 /// Plain with "folder/deep/inside", and the branch "topic", where "folder" is a file.
