@@ -16,6 +16,7 @@
 #include "main/checkout/overlookedEdits.hpp"
 #include "main/checkout/severalBases.hpp"
 #include "main/mergeState/MergeBases.hpp"
+#include "util/repository/fatalPatterns.hpp"
 #include "util/repository/repository.hpp"
 
 namespace vclink::git
@@ -82,6 +83,7 @@ CheckoutWatch::CheckoutWatch(CheckoutKind kind, git_repository *repository,
 WorkingCopy &CheckoutWatch::lookAtWorkingCopy()
 {
     WorkingCopy &copy = copy_.emplace(repository_);
+    refuseFatalPatternsInFolders(repository_, copy.index());
     // Otherwise libgit2 reads HEAD again. Without an index it must: that is a first checkout.
     if (copy.hasIndex())
     {

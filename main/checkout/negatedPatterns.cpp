@@ -116,6 +116,11 @@ bool isDoubtful(const std::string &line, const Name &name)
 
 bool mayNegate(const std::string &path, const Name &name)
 {
+    // Whoever opens a FIFO waits for a writer.
+    if (standingAt(path) == Standing::Special)
+    {
+        return true;
+    }
     std::ifstream file(path);
     if (!file)
     {

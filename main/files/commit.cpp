@@ -26,6 +26,7 @@
 #include "main/mergeState/unfinishedOperation.hpp"
 #include "util/lock/IndexLock.hpp"
 #include "util/lock/referenceLocks.hpp"
+#include "util/repository/fatalPatterns.hpp"
 #include "util/repository/repository.hpp"
 
 namespace vclink::git
@@ -164,6 +165,7 @@ void GitAdapter::createCommit(git_repository *repository, const ustring &message
     // First, so that nothing has changed if there is no identity.
     const OwnedHandle<git_signature> signature = makeSignature(repository);
     const OwnedHandle<git_index> index = getRepositoryIndex(repository);
+    refuseFatalPatternsInFolders(repository, index.get());
     refreshForCommit(repository, index.get(), head, parents);
     if (expectedMerge_ != nullptr)
     {

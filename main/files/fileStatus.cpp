@@ -11,6 +11,7 @@
 #include "options/Callbacks.hpp"
 #include "options/gitRecords.hpp"
 #include "util/path/PathspecArray.hpp"
+#include "util/repository/fatalPatterns.hpp"
 #include "util/repository/repository.hpp"
 #include "vclink/git/StatusOptions.hpp"
 
@@ -55,6 +56,7 @@ FileStateMap GitAdapter::collectFileStates(char **pathspecStrings, std::size_t p
     git_status_options record = toGitStatusOptions(options);
     record.pathspec = {pathspecStrings, pathspecCount};
     const OwnedHandle<git_repository> repository = openWorkingCopy(root_);
+    refuseFatalPatternsInFolders(repository.get());
     // Intentionally ignored: the caller gets the states up to the failure of the walk.
     static_cast<void>(call(git_status_foreach_ext, repository.get(), &record,
                            makeCallback<&StatusCallbacks::status, git_status_cb>(), &callbacks));

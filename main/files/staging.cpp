@@ -12,6 +12,7 @@
 #include "main/files/prepareAddition.hpp"
 #include "util/lock/IndexLock.hpp"
 #include "util/path/PathspecArray.hpp"
+#include "util/repository/fatalPatterns.hpp"
 #include "util/repository/repository.hpp"
 #include "vclink/git/messageIdentifiers.hpp"
 #include "vclink/util/generateFileReport.hpp"
@@ -101,6 +102,7 @@ void GitAdapter::addToIndex(const std::vector<upath> &files)
     const OwnedHandle<git_repository> repository = openWorkingCopy(root_);
     IndexLock lock(repository.get());
     const OwnedHandle<git_index> index = getRepositoryIndex(repository.get());
+    refuseFatalPatternsInFolders(repository.get(), index.get());
     const PathspecArray pathspec = makeFilePathspec(files, root_);
     refuseOtherCase(index.get(), pathspec.array());
     HeldEntries held;

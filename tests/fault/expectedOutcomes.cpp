@@ -162,7 +162,7 @@ std::vector<Tolerance> tolerancesOfRemotes(const std::string &normal)
         // What is not there can't be lost.
         {"fetchGuarded", "git_reference_name_to_id", any, GIT_ENOTFOUND, normal},
         {"pushGuarded", "git_reference_name_to_id", any, GIT_ENOTFOUND, normal},
-        // Below the commits of a shallow repository there are none.
+        // Below the commits of a shallow repository there are none, for all one knows.
         {"fetchGuarded", "git_commit_lookup", any, GIT_ENOTFOUND,
          failure(GIT_ENONFASTFORWARD, GIT_ERROR_REFERENCE,
                  "'refs/heads/copy' has commits that the remote does not have: fetch into "
@@ -231,6 +231,19 @@ std::vector<Tolerance> tolerancesOfOthers(const std::string &operation, const st
                    "the conflict in 'file' cannot be written beside 'file.lock': merge with 'git "
                    "merge'")},
         {"merge", "git_merge_bases", any, GIT_ENOTFOUND, normal},
+        // The look for patterns that would not end passes over what cannot be read.
+        {"getF", "git_repository_index", 1, any, normal},
+        {"addFiles", "git_repository_index", 1, any, normal},
+        {"removeFiles", "git_repository_index", 1, any, normal},
+        {"revertFiles", "git_repository_index", 1, any, normal},
+        {"commitMergeOfSubmodule", "git_repository_open_ext", 2, any, normal},
+        {"commitMergeOfSubmodule", "git_repository_index", 2, any, normal},
+        {"switchBranchWithSubmodules", "git_repository_open_ext", 2, any, normal},
+        {"switchBranchWithSubmodules", "git_repository_index", 2, any, normal},
+        {"mergeSubmodules", "git_repository_open_ext", 2, any, normal},
+        {"mergeSubmodules", "git_repository_index", 2, any, normal},
+        {"mergeSubmodules", "git_repository_open_ext", 4, any, normal},
+        {"mergeSubmodules", "git_repository_index", 6, any, normal},
         // Only no is an answer.
         {"switchBranchInPartialClone", "git_odb_exists", any, any, normal},
         {"getFolderStatesOfMovedTree", "git_repository_is_worktree", any, any, normal},

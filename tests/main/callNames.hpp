@@ -10,9 +10,11 @@ namespace vclink::test
 /// Functions in the order in which they were called.
 using CallNames = std::vector<std::string>;
 
-/// The calls of the query that comes before files are staged or reverted.
+/// The calls of the query that comes before files are staged or reverted. The index tells where
+/// patterns of ignored files are, before libgit2 reads them.
 inline const CallNames ofTheQuery{"git_status_options_init", "git_repository_open_ext",
-                                  "git_status_foreach_ext", "git_repository_free"};
+                                  "git_repository_index",    "git_index_free",
+                                  "git_status_foreach_ext",  "git_repository_free"};
 
 inline CallNames operator+(CallNames left, const CallNames &right)
 {

@@ -7,9 +7,11 @@
 #include <string_view>
 
 #include <git2/errors.h>
+#include <git2/index.h>
 #include <git2/repository.h>
 #include <sys/stat.h>
 
+#include "error/errorUtil/GitResult.hpp"
 #include "error/errorUtil/raiseGitError.hpp"
 
 namespace vclink::git
@@ -139,8 +141,13 @@ bool isKeptEmpty(const Pattern &pattern)
 std::string textOf(const std::string &path)
 {
     struct stat status = {};
-    // Whoever opens a FIFO waits for a writer.
-    if (::stat(path.c_str(), &status) != 0 || !S_ISREG(status.st_mode))
+    const bool isThere = ::stat(path.c_str(), &status) == 0;
+    if (isThere && S_ISFIFO(status.st_mode))
+    {
+        raiseGitError(GIT_ERROR, GIT_ERROR_REPOSITORY,
+                      "'" + path + "' is a FIFO, and libgit2 would wait for a writer: remove it");
+    }
+    if (!isThere || !S_ISREG(status.st_mode))
     {
         return {};
     }
@@ -148,9 +155,9 @@ std::string textOf(const std::string &path)
     return {std::istreambuf_iterator<char>(file), std::istreambuf_iterator<char>()};
 }
 
-void refuseFatalPatternsIn(const std::string &path)
+void refuseFatalPatternsIn(const std::string &path, PatternPlace place)
 {
-    const FatalPattern found = findFatalPattern(textOf(path));
+    const FatalPattern found = findFatalPattern(textOf(path), place);
     if (found.fault != PatternFault::None)
     {
         raiseGitError(GIT_ERROR, GIT_ERROR_REPOSITORY,
@@ -162,9 +169,32 @@ void refuseFatalPatternsIn(const std::string &path)
     }
 }
 
+bool hasPatterns(std::string_view path)
+{
+    constexpr std::string_view name = "/.gitignore";
+    return path.size() > name.size() && path.substr(path.size() - name.size()) == name;
+}
+
+/// A submodule that cannot be opened is none to libgit2 either.
+void refuseFatalPatternsInSubmodule(const std::string &folder)
+{
+    struct stat status = {};
+    if (lstat(folder.c_str(), &status) != 0 || !S_ISDIR(status.st_mode))
+    {
+        return;
+    }
+    const GitResult<OwnedHandle<git_repository>> submodule = acquire<git_repository>(
+        git_repository_open_ext, folder.c_str(), GIT_REPOSITORY_OPEN_NO_SEARCH, nullptr);
+    if (submodule.has_value())
+    {
+        refuseFatalPatterns(submodule.value().get());
+        refuseFatalPatternsInFolders(submodule.value().get());
+    }
+}
+
 } // namespace
 
-FatalPattern findFatalPattern(const std::string &text)
+FatalPattern findFatalPattern(const std::string &text, PatternPlace place)
 {
     constexpr std::string_view byteOrderMark = "\xEF\xBB\xBF";
     // For libgit2, the text ends there.
@@ -177,15 +207,15 @@ FatalPattern findFatalPattern(const std::string &text)
     {
         const std::size_t left = reader.left();
         const Pattern pattern = reader.read();
-        const bool endsProcess =
-            pattern.isNegated && !pattern.hasWildcards && hasWildcards && isKeptEmpty(pattern);
+        const bool endsProcess = place == PatternPlace::Root && pattern.isNegated &&
+                                 !pattern.hasWildcards && hasWildcards && isKeptEmpty(pattern);
         const bool neverEnds = reader.left() == left;
         if (endsProcess || neverEnds)
         {
             const auto begin = content.begin();
-            const auto place = begin + static_cast<std::ptrdiff_t>(content.size() - left);
+            const auto line = begin + static_cast<std::ptrdiff_t>(content.size() - left);
             return {endsProcess ? PatternFault::EndsProcess : PatternFault::NeverEnds,
-                    static_cast<int>(std::count(begin, place, '\n')) + 1};
+                    static_cast<int>(std::count(begin, line, '\n')) + 1};
         }
         hasWildcards = hasWildcards || (pattern.isRule && pattern.hasWildcards);
     }
@@ -197,9 +227,38 @@ void refuseFatalPatterns(git_repository *repository)
     const char *const workdir = git_repository_workdir(repository);
     if (workdir != nullptr)
     {
-        refuseFatalPatternsIn(workdir + std::string(".gitignore"));
+        refuseFatalPatternsIn(workdir + std::string(".gitignore"), PatternPlace::Root);
     }
-    refuseFatalPatternsIn(git_repository_commondir(repository) + std::string("info/exclude"));
+    refuseFatalPatternsIn(git_repository_commondir(repository) + std::string("info/exclude"),
+                          PatternPlace::Root);
+}
+
+void refuseFatalPatternsInFolders(git_repository *repository)
+{
+    const GitResult<OwnedHandle<git_index>> index =
+        acquire<git_index>(git_repository_index, repository);
+    if (index.has_value())
+    {
+        refuseFatalPatternsInFolders(repository, index.value().get());
+    }
+}
+
+void refuseFatalPatternsInFolders(git_repository *repository, git_index *index)
+{
+    const char *const workdir = git_repository_workdir(repository);
+    const std::size_t count = workdir != nullptr ? git_index_entrycount(index) : 0;
+    for (std::size_t i = 0; i < count; ++i)
+    {
+        const git_index_entry &entry = *git_index_get_byindex(index, i);
+        if (entry.mode == GIT_FILEMODE_COMMIT)
+        {
+            refuseFatalPatternsInSubmodule(std::string(workdir) + entry.path);
+        }
+        else if (hasPatterns(entry.path))
+        {
+            refuseFatalPatternsIn(std::string(workdir) + entry.path, PatternPlace::Folder);
+        }
+    }
 }
 
 } // namespace vclink::git

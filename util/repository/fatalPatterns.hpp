@@ -25,15 +25,33 @@ struct FatalPattern
     int number = 0;
 };
 
+/// Where the patterns are.
+enum class PatternPlace
+{
+    /// a `.gitignore` in the root of a working tree, or `.git/info/exclude`
+    Root,
+    /// a `.gitignore` of another folder, in which no line makes libgit2 read a null pointer
+    Folder
+};
+
 /// Finds the first such line.
-/// @param text of a `.gitignore` in the root of a working tree, or of `.git/info/exclude`; in other
-/// folders libgit2 does not read a null pointer
-FatalPattern findFatalPattern(const std::string &text);
+FatalPattern findFatalPattern(const std::string &text, PatternPlace place = PatternPlace::Root);
 
 /// Refuses a working copy if one of the two files has such a line: whoever made the repository
 /// could end the host, or keep an operation from ending. For operations that look for untracked or
-/// ignored files. A file that cannot be read counts as empty, as for libgit2.
+/// ignored files. A file that cannot be read counts as empty, as for libgit2; a FIFO is refused,
+/// too.
 /// @throws LibGit2Exception that names the file and the line
 void refuseFatalPatterns(git_repository *repository);
+
+/// Refuses the same in submodules, which libgit2 looks into to know whether they have changed, and
+/// in the folders of both, if their `.gitignore` is tracked: others are only found by a walk, and
+/// libgit2's does not end.
+/// @param index of the repository
+/// @throws LibGit2Exception that names the file and the line
+void refuseFatalPatternsInFolders(git_repository *repository, git_index *index);
+
+/// The same with the index as it is now; if it cannot be read, nothing is refused.
+void refuseFatalPatternsInFolders(git_repository *repository);
 
 } // namespace vclink::git

@@ -5,6 +5,7 @@
 #include <chrono>
 #include <csignal>
 #include <cstddef>
+#include <filesystem>
 #include <functional>
 #include <random>
 #include <string>
@@ -13,6 +14,7 @@
 #include <git2.h>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
+#include <sys/stat.h>
 
 #include "CommitFixture.hpp"
 #include "support/ChildProcess.hpp"
@@ -25,6 +27,7 @@ namespace
 using testing::HasSubstr;
 using vclink::git::findFatalPattern;
 using vclink::git::PatternFault;
+using vclink::git::PatternPlace;
 using namespace vclink::test;
 
 class FatalPatterns : public CommitFixture
@@ -47,6 +50,19 @@ class FatalPatterns : public CommitFixture
             },
             timeout);
         return !end.empty();
+    }
+
+    /// Returns why a query of the states fails, in a child because it might never end.
+    std::string queryInChild() const
+    {
+        return runInChild(
+            [this]
+            {
+                const auto adapter = makeAdapter(repository_.path());
+                adapter->getFolderStates(adapter->getRootFolder());
+                return std::string();
+            },
+            std::chrono::seconds(30));
     }
 
     void expectRefused(const std::function<void()> &action) const
@@ -119,6 +135,78 @@ TEST_F(FatalPatterns, StopEachOperationThatReadsThem)
     }
     add({"new"});
     EXPECT_THAT(status(), testing::Contains("A  new"));
+}
+
+TEST_F(FatalPatterns, InAFolderAreThoseAtWhichLibGit2NeverEnds)
+{
+    EXPECT_EQ(findFatalPattern("x*\n!//\n", PatternPlace::Folder).fault, PatternFault::None);
+    const auto found = findFatalPattern("x*\n!//\n\f\n", PatternPlace::Folder);
+    EXPECT_EQ(found.fault, PatternFault::NeverEnds);
+    EXPECT_EQ(found.number, 3);
+    repository_.write("folder/.gitignore", "x*\n!//\n");
+    repository_.commitAll("patterns");
+    EXPECT_EQ(queryInChild(), "");
+}
+
+TEST_F(FatalPatterns, InATrackedFileOfAFolderStopEachOperationThatReadsThem)
+{
+    repository_.write("folder/.gitignore", "*.o\n");
+    repository_.commitAll("patterns");
+    repository_.makeBranch("topic", writes("file", "of topic\n"));
+    repository_.write("folder/.gitignore", "*.o\n\f\n");
+    repository_.write("file", "edited\n");
+    repository_.write("folder/new", "x");
+    ASSERT_THAT(queryInChild(), HasSubstr("would keep the operation from ending"));
+    const auto adapter = makeAdapter(repository_.path());
+    const auto branches = vclink::git::BranchManager::create(*adapter);
+    expectRefused([this] { add({"folder/new"}); });
+    expectRefused([this] { remove({"file"}); });
+    expectRefused([this] { markResolved("file"); });
+    expectRefused([this] { revert({"file"}); });
+    expectRefused([this] { commit(); });
+    expectRefused([&] { branches->switchBranch("topic"); });
+    EXPECT_THROW(branches->merge("topic"), vclink::git::GitException);
+    EXPECT_EQ(repository_.read("file"), "edited\n");
+    repository_.write("folder/.gitignore", "*.o\n");
+    add({"folder/new"});
+    EXPECT_THAT(status(), testing::Contains("A  folder/new"));
+}
+
+TEST_F(FatalPatterns, InASubmoduleStopAQuery)
+{
+    GitRepository other = makeRepository("other");
+    other.write("folder/.gitignore", "*.o\n");
+    other.commitAll("patterns");
+    repository_.git(
+        {"-c", "protocol.file.allow=always", "submodule", "add", other.path().string(), "library"});
+    repository_.commitAll("submodule");
+    for (const std::string name : {"library/.gitignore", "library/folder/.gitignore"})
+    {
+        repository_.write(name, "*.o\n\f\n");
+        EXPECT_THAT(queryInChild(),
+                    HasSubstr("line 2 of '" + (repository_.path() / name).string()));
+        repository_.write(name, "*.o\n");
+    }
+    repository_.write("library/.gitignore", "*.o\n!//\n");
+    EXPECT_THAT(queryInChild(), HasSubstr("would end the process"));
+    std::filesystem::remove_all(repository_.path() / "library");
+    EXPECT_EQ(queryInChild(), "");
+}
+
+TEST_F(FatalPatterns, AFifoInTheirPlaceStopsAQuery)
+{
+    repository_.write("folder/.gitignore", "*.o\n");
+    repository_.commitAll("patterns");
+    for (const std::string name : {".gitignore", "folder/.gitignore", ".git/info/exclude"})
+    {
+        const auto path = repository_.path() / name;
+        std::filesystem::create_directories(path.parent_path());
+        std::filesystem::remove(path);
+        ASSERT_EQ(mkfifo(path.c_str(), 0600), 0);
+        EXPECT_THAT(queryInChild(), HasSubstr("'" + path.string() + "' is a FIFO"));
+        std::filesystem::remove(path);
+    }
+    EXPECT_EQ(queryInChild(), "");
 }
 
 } // namespace
