@@ -2,6 +2,7 @@
 #include "main/checkout/treeChanges.hpp"
 
 #include <cstddef>
+#include <cstring>
 #include <utility>
 #include <vector>
 
@@ -64,6 +65,10 @@ int compare(const git_tree_entry *left, const git_tree_entry *right)
 {
     const char *const leftName = git_tree_entry_name(left);
     const char *const rightName = git_tree_entry_name(right);
+    if (std::strcmp(leftName, rightName) == 0)
+    {
+        return int{isFolder(left)} - int{isFolder(right)};
+    }
     std::size_t place = 0;
     while (leftName[place] != 0 && leftName[place] == rightName[place])
     {
