@@ -86,6 +86,11 @@ bool stands(CMAdapter &adapter, const char *name)
 
 void refuseHalfWay(CMAdapter &adapter)
 {
+    // Between two steps of a series, a commit keeps the others, as in git.
+    if (git::BranchManager::create(adapter)->getRepositoryState() == "Normal")
+    {
+        return;
+    }
     const std::string operation = describeOperation(adapter);
     if (!operation.empty())
     {

@@ -109,13 +109,18 @@ TEST_F(ShellUnfinished, SeriesOfRevertsAreNotCutShort)
 }
 
 /// git takes the state of the one commit away, the back end says "Normal".
-TEST_F(ShellUnfinished, SeriesAreKnownAlsoBetweenTwoCommits)
+TEST_F(ShellUnfinished, CommitsBetweenTwoPicksKeepTheOthers)
 {
     begin({"cherry-pick", "main..other"});
     repository_.write("a", "solution\n");
     repository_.git({"commit", "--quiet", "--all", "--message=picked"});
     ASSERT_EQ(state(), "Normal\n");
-    EXPECT_THAT(refuse({"commit", "-m", "Work"}), HasSubstr("A series of picked"));
+    EXPECT_THAT(refuse({"switch", "other"}), HasSubstr("A series of picked"));
+    repository_.write("a", "edited\n");
+    succeed({"commit", "-m", "Work"});
+    repository_.git({"cherry-pick", "--continue"});
+    EXPECT_EQ(content(), "edited\ntheirs\n");
+    EXPECT_EQ(repository_.git({"show", "HEAD:new"}), "theirs\n");
 }
 
 TEST_F(ShellUnfinished, SeriesAreKnownInALinkedWorkingCopy)
