@@ -12,6 +12,7 @@
 #include "main/checkout/askRules.hpp"
 #include "main/checkout/conflictLocks.hpp"
 #include "main/checkout/gitlinks.hpp"
+#include "main/checkout/mountPoints.hpp"
 #include "main/checkout/obstaclesAhead.hpp"
 #include "main/checkout/overlookedEdits.hpp"
 #include "main/checkout/severalBases.hpp"
@@ -105,6 +106,10 @@ void CheckoutWatch::lookBeforeSwitch(const git_object *target)
                          found = judgeSwitch(copy, change);
                          return !found;
                      });
+    if (!found)
+    {
+        found = findMountPoint(mountPointsBelow(root_), copy.head(), tree.get());
+    }
     if (found)
     {
         refuse(*found);
@@ -142,6 +147,7 @@ void CheckoutWatch::lookBeforeMerge(const git_oid *theirs)
     const OwnedHandle<git_tree> after = treeOf(repository_, theirs);
     const std::vector<OwnedHandle<git_tree>> bases =
         readTrees(repository_, MergeBases(repository_, &ours, theirs));
+    const std::vector<std::string> mounts = mountPointsBelow(root_);
     Finding first = firstOf(findUnmerged(copy), findHiddenEdit(copy));
     Finding yielding;
     bool mayBeRenamed = false;
@@ -172,7 +178,7 @@ void CheckoutWatch::lookBeforeMerge(const git_oid *theirs)
         {
             found = againstFolders.find(repository_, copy, before.get(), after.get());
         }
-        first = firstOf(first, found);
+        first = firstOf(firstOf(first, found), findMountPoint(mounts, before.get(), after.get()));
     }
     if (bases.size() > 1)
     {

@@ -4,6 +4,7 @@
 #include <cstddef>
 #include <optional>
 #include <string>
+#include <vector>
 
 #include <git2/checkout.h>
 #include <git2/types.h>
@@ -85,6 +86,7 @@ class CheckoutWatch
     static void passProgress(const char *path, std::size_t completed, std::size_t total,
                              void *payload) noexcept;
     int hear(const CheckoutNotice &notice);
+    Finding findMounted(const CheckoutNotice &notice);
     int answer(const Finding &found);
     Finding noteOverwritten(const CheckoutNotice &notice);
     Finding judge(const CheckoutNotice &notice);
@@ -112,6 +114,8 @@ class CheckoutWatch
     MergeSubmodules merged_;
     /// The record's own value, while a switch keeps submodules.
     OwnedHandle<git_index> baseline_;
+    /// Below the root, since the first notification of a revert.
+    std::optional<std::vector<std::string>> mounts_;
     bool hasHeard_ = false;
     bool hasRefused_ = false;
     /// What libgit2 itself replaces, according to its last notification with something in that

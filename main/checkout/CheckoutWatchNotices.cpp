@@ -2,6 +2,7 @@
 // CheckoutWatch: what libgit2 reports during the checkout, before it writes the first file.
 #include "main/checkout/CheckoutWatch.hpp"
 
+#include <algorithm>
 #include <array>
 #include <cstddef>
 #include <utility>
@@ -13,6 +14,7 @@
 #include "error/errorUtil/libgit2Errors.hpp"
 #include "main/checkout/askRules.hpp"
 #include "main/checkout/gitlinks.hpp"
+#include "main/checkout/mountPoints.hpp"
 #include "main/checkout/noticedObstacles.hpp"
 
 namespace vclink::git
@@ -83,6 +85,17 @@ Finding CheckoutWatch::noteOverwritten(const CheckoutNotice &notice)
                : Obstacle{notice.path, "the file '" + std::string(notice.path) + "' " + reason};
 }
 
+Finding CheckoutWatch::findMounted(const CheckoutNotice &notice)
+{
+    if (!mounts_)
+    {
+        mounts_ = mountPointsBelow(root_);
+    }
+    return std::find(mounts_->begin(), mounts_->end(), notice.path) != mounts_->end()
+               ? Finding(mountedAt(notice.path))
+               : Finding();
+}
+
 int CheckoutWatch::hear(const CheckoutNotice &notice)
 {
     if (notice.path == nullptr)
@@ -91,7 +104,8 @@ int CheckoutWatch::hear(const CheckoutNotice &notice)
     }
     if (kind_ == CheckoutKind::Revert)
     {
-        const Finding found = clearAll(notice);
+        Finding found = findMounted(notice);
+        found = found ? found : clearAll(notice);
         return answer(found ? found : noteOverwritten(notice));
     }
     if (!copy_)

@@ -47,17 +47,12 @@ bool isSame(const git_tree_entry *left, const git_tree_entry *right)
            git_tree_entry_filemode(left) == git_tree_entry_filemode(right);
 }
 
-bool isFolder(const git_tree_entry *entry)
-{
-    return git_tree_entry_type(entry) == GIT_OBJECT_TREE;
-}
-
 /// Returns the byte at this position of a name. In the order of a tree, the name of a folder ends
 /// with a slash.
 unsigned char byteOf(const git_tree_entry *entry, const char *name, std::size_t place)
 {
     const auto byte = static_cast<unsigned char>(name[place]);
-    return byte == 0 && isFolder(entry) ? '/' : byte;
+    return byte == 0 && isTree(entry) ? '/' : byte;
 }
 
 /// As git_tree_entry_cmp, without a function call for each file.
@@ -67,7 +62,7 @@ int compare(const git_tree_entry *left, const git_tree_entry *right)
     const char *const rightName = git_tree_entry_name(right);
     if (std::strcmp(leftName, rightName) == 0)
     {
-        return int{isFolder(left)} - int{isFolder(right)};
+        return int{isTree(left)} - int{isTree(right)};
     }
     std::size_t place = 0;
     while (leftName[place] != 0 && leftName[place] == rightName[place])
@@ -153,7 +148,7 @@ void visitTreeChanges(git_repository *repository, const git_tree *before, const 
         {
             path.resize(levels.back().pathSize);
             path += git_tree_entry_name(either);
-            if (isFolder(either))
+            if (isTree(either))
             {
                 path += '/';
                 levels.push_back(

@@ -25,6 +25,11 @@ struct TreeChange
     const git_tree_entry *after;
 };
 
+inline bool isTree(const git_tree_entry *entry)
+{
+    return git_tree_entry_type(entry) == GIT_OBJECT_TREE;
+}
+
 /// Returns true if a file stays a file, as in most changes. Fewer rules apply to it.
 inline bool staysFile(const TreeChange &change)
 {
