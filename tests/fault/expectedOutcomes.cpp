@@ -197,6 +197,25 @@ std::vector<Tolerance> tolerancesOfLists(const std::string &normal)
     };
 }
 
+/// The look for patterns that would not end passes over what cannot be read.
+std::vector<Tolerance> tolerancesOfPatterns(const std::string &normal)
+{
+    return {
+        {"getF", "git_repository_index", 1, any, normal},
+        {"addFiles", "git_repository_index", 1, any, normal},
+        {"removeFiles", "git_repository_index", 1, any, normal},
+        {"revertFiles", "git_repository_index", 1, any, normal},
+        {"commitMergeOfSubmodule", "git_repository_open_ext", 2, any, normal},
+        {"commitMergeOfSubmodule", "git_repository_index", 2, any, normal},
+        {"switchBranchWithSubmodules", "git_repository_open_ext", 2, any, normal},
+        {"switchBranchWithSubmodules", "git_repository_index", 2, any, normal},
+        {"mergeSubmodules", "git_repository_open_ext", 2, any, normal},
+        {"mergeSubmodules", "git_repository_index", 2, any, normal},
+        {"mergeSubmodules", "git_repository_open_ext", 4, any, normal},
+        {"mergeSubmodules", "git_repository_index", 6, any, normal},
+    };
+}
+
 std::vector<Tolerance> tolerancesOfOthers(const std::string &operation, const std::string &normal)
 {
     return {
@@ -231,19 +250,6 @@ std::vector<Tolerance> tolerancesOfOthers(const std::string &operation, const st
                    "the conflict in 'file' cannot be written beside 'file.lock': merge with 'git "
                    "merge'")},
         {"merge", "git_merge_bases", any, GIT_ENOTFOUND, normal},
-        // The look for patterns that would not end passes over what cannot be read.
-        {"getF", "git_repository_index", 1, any, normal},
-        {"addFiles", "git_repository_index", 1, any, normal},
-        {"removeFiles", "git_repository_index", 1, any, normal},
-        {"revertFiles", "git_repository_index", 1, any, normal},
-        {"commitMergeOfSubmodule", "git_repository_open_ext", 2, any, normal},
-        {"commitMergeOfSubmodule", "git_repository_index", 2, any, normal},
-        {"switchBranchWithSubmodules", "git_repository_open_ext", 2, any, normal},
-        {"switchBranchWithSubmodules", "git_repository_index", 2, any, normal},
-        {"mergeSubmodules", "git_repository_open_ext", 2, any, normal},
-        {"mergeSubmodules", "git_repository_index", 2, any, normal},
-        {"mergeSubmodules", "git_repository_open_ext", 4, any, normal},
-        {"mergeSubmodules", "git_repository_index", 6, any, normal},
         // Only no is an answer.
         {"switchBranchInPartialClone", "git_odb_exists", any, any, normal},
         {"getFolderStatesOfMovedTree", "git_repository_is_worktree", any, any, normal},
@@ -275,6 +281,8 @@ std::vector<Tolerance> tolerancesOf(const std::string &operation, const std::str
     all.insert(all.end(), remotes.begin(), remotes.end());
     const std::vector<Tolerance> lists = tolerancesOfLists(normal);
     all.insert(all.end(), lists.begin(), lists.end());
+    const std::vector<Tolerance> patterns = tolerancesOfPatterns(normal);
+    all.insert(all.end(), patterns.begin(), patterns.end());
     const std::vector<Tolerance> others = tolerancesOfOthers(operation, normal);
     all.insert(all.end(), others.begin(), others.end());
     return all;

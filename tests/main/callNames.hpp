@@ -10,7 +10,7 @@ namespace vclink::test
 /// Functions in the order in which they were called.
 using CallNames = std::vector<std::string>;
 
-/// The calls of the query that comes before files are staged or reverted. The index tells where
+/// The calls of the query that comes before files are staged or reverted. The index shows where
 /// patterns of ignored files are, before libgit2 reads them.
 inline const CallNames ofTheQuery{"git_status_options_init", "git_repository_open_ext",
                                   "git_repository_index",    "git_index_free",

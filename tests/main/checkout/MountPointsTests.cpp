@@ -58,7 +58,7 @@ class MountPoints : public ObstacleFixture
 {
   protected:
     /// Mounts a name, and expects this refusal of the switch to "topic" and of its merge.
-    void expectRefused(const std::string &name) const
+    void expectBothRefused(const std::string &name) const
     {
         const Mount mount(folder() / "mounted", repository_ / name);
         if (!mount.isMounted())
@@ -88,13 +88,13 @@ TEST_F(MountPoints, AreThoseOfTheListBelowTheRoot)
 TEST_F(MountPoints, StopACheckoutThatWouldRemoveTheFolder)
 {
     diverge(writes("ours", "x"), removes("d/f") + removes("d/g") + removes("other"));
-    expectRefused("d");
+    expectBothRefused("d");
 }
 
 TEST_F(MountPoints, StopACheckoutThatWouldChangeTheFile)
 {
     theyWrite({"file"});
-    expectRefused("file");
+    expectBothRefused("file");
 }
 
 TEST_F(MountPoints, StopARevertOfTheFile)

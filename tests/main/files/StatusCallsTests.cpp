@@ -15,6 +15,7 @@
 #include "error/errorUtil/libgit2Errors.hpp"
 #include "main/AdapterFixture.hpp"
 #include "main/TestOptionsFactory.hpp"
+#include "main/callNames.hpp"
 #include "options/Callbacks.hpp"
 #include "support/LogCapture.hpp"
 #include "support/libgit2/LibGit2Recorder.hpp"
