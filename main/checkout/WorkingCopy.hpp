@@ -118,6 +118,12 @@ class WorkingCopy
     /// Returns true if the content of the file, link or folder differs from its entry in the index.
     /// A missing file does not differ.
     bool isEdited(const git_index_entry &entry);
+    /// Returns true if libgit2 cannot tell an edited file from its entry in the index or from what
+    /// a checkout writes, because it compares them after the conversion of line ends or of `$Id$`.
+    /// @param entry has another size than the file, which exists
+    /// @param after may be null
+    [[nodiscard]] bool isEditHiddenByConversion(const git_index_entry &entry,
+                                                const git_tree_entry *after) const;
 
   private:
     /// In a buffer that the next call uses again: this runs for each file of a checkout.
@@ -127,6 +133,7 @@ class WorkingCopy
     const Way &findWay(const std::string &name);
     Way wayInto(const std::string &folder, const Way &above) const;
     git_oid idOf(const std::string &name, Standing standing) const;
+    git_oid idOfFile(const std::string &name, const std::string &nameForFilters) const;
 
     git_repository *repository_;
     std::string root_;

@@ -18,6 +18,12 @@
 
 namespace vclink::git
 {
+namespace
+{
+
+constexpr const char *withoutFilters = "";
+
+} // namespace
 
 bool WorkingCopy::isReadable(const std::string &name)
 {
@@ -67,21 +73,37 @@ bool WorkingCopy::isEdited(const git_index_entry &entry)
     return standing == Standing::Special || (standing == Standing::Folder && holdsFiles(name));
 }
 
+bool WorkingCopy::isEditHiddenByConversion(const git_index_entry &entry,
+                                           const git_tree_entry *after) const
+{
+    const std::string name = entry.path;
+    const git_oid id = idOfFile(name, name);
+    const auto isHiddenTarget = [&]
+    {
+        return after != nullptr && isSameId(id, *git_tree_entry_id(after)) &&
+               !isSameId(id, idOfFile(name, withoutFilters));
+    };
+    return isSameId(id, entry.id) || isHiddenTarget();
+}
+
 /// Returns the id of the file as git would store it.
 git_oid WorkingCopy::idOf(const std::string &name, Standing standing) const
 {
+    if (standing != Standing::Link)
+    {
+        return idOfFile(name, name);
+    }
     git_oid id{};
-    const std::string path = root_ + name;
-    if (standing == Standing::Link)
-    {
-        const std::string target = readLink(path);
-        check(git_odb_hash, &id, target.data(), target.size(), GIT_OBJECT_BLOB);
-    }
-    else
-    {
-        check(git_repository_hashfile, &id, repository_, path.c_str(), GIT_OBJECT_BLOB,
-              name.c_str());
-    }
+    const std::string target = readLink(root_ + name);
+    check(git_odb_hash, &id, target.data(), target.size(), GIT_OBJECT_BLOB);
+    return id;
+}
+
+git_oid WorkingCopy::idOfFile(const std::string &name, const std::string &nameForFilters) const
+{
+    git_oid id{};
+    check(git_repository_hashfile, &id, repository_, (root_ + name).c_str(), GIT_OBJECT_BLOB,
+          nameForFilters.c_str());
     return id;
 }
 

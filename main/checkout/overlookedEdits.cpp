@@ -21,6 +21,13 @@ bool hasSizeAndTimeOf(const git_index_entry &entry, const struct stat &status)
            isSameTime(entry.mtime, status.st_mtim);
 }
 
+/// git takes such a file for changed without reading it. An entry without a size has to be
+/// compared.
+bool hasOtherSizeThan(const git_index_entry &entry, const struct stat &status)
+{
+    return entry.file_size != 0 && entry.file_size != static_cast<std::uint32_t>(status.st_size);
+}
+
 bool hasInodeOf(const git_index_entry &entry, const struct stat &status)
 {
     return entry.ino == static_cast<std::uint32_t>(status.st_ino) &&
@@ -54,8 +61,12 @@ Finding findOverlookedEdit(WorkingCopy &copy, const TreeChange &change)
                                          "checkout"};
     }
     const bool isOfSameKind = (entry->mode & S_IFMT) == (status.st_mode & S_IFMT);
-    if (isAsLibGit2Sees && isOfSameKind && !copy.isConvertedByGit(change.path) &&
-        copy.isEdited(*entry))
+    const bool isEditOfSameSize = isAsLibGit2Sees && isOfSameKind &&
+                                  !copy.isConvertedByGit(change.path) && copy.isEdited(*entry);
+    const bool isHiddenEdit = S_ISREG(status.st_mode) && isOfSameKind &&
+                              hasOtherSizeThan(*entry, status) &&
+                              copy.isEditHiddenByConversion(*entry, change.after);
+    if (isEditOfSameSize || isHiddenEdit)
     {
         return Obstacle{change.path, "the uncommitted changes of '" + change.path +
                                          "' would be lost in the checkout"};

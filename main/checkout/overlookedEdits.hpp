@@ -12,7 +12,8 @@ namespace vclink::git
 
 /// Finds a tracked file with a change that libgit2 does not see: it compares only the size and the
 /// time of the last change, and takes a file that it cannot read for an unchanged one. git also
-/// compares the inode and the time at which that changed.
+/// compares the inode and the time at which that changed. If the size differs, libgit2 compares the
+/// content after the conversion of line ends, and git takes the file for changed.
 /// Also finds a folder in the place of a tracked file, if the name is ignored: libgit2 would delete
 /// the folder.
 Finding findOverlookedEdit(WorkingCopy &copy, const TreeChange &change);

@@ -2,7 +2,9 @@
 #include "main/checkout/overlookedEdits.hpp"
 
 #include <array>
+#include <cstddef>
 #include <string>
+#include <vector>
 
 #include <fcntl.h>
 #include <gmock/gmock.h>
@@ -126,6 +128,82 @@ TEST_F(OverlookedEdits, AreNotPlainFilesInThePlaceOfLinks)
     repository_.git({"update-index", "--refresh"});
     writesAtTheSameTime("d/link", "f")(repository_);
     expectRefused(refusal("1 conflict prevents checkout"));
+}
+
+/// Line ends, also in a file that is not a text, and `$Id$`: git compares the size first.
+TEST_F(OverlookedEdits, ThatConversionHidesAreKept)
+{
+    struct Case
+    {
+        std::string attributes;
+        std::string committed;
+        std::string edited;
+    };
+    const std::vector<Case> cases{
+        {"text", "a\nb\n", "a\r\nb\n"},
+        {"text", std::string("a\0\nb\n", 5), std::string("a\0\r\nb\n", 6)},
+        {"text eol=crlf", "a\nb\n", "a\r\nb\n"},
+        {"ident", "$Id$\n", "$Id: mine $\n"}};
+    for (const auto &[attributes, committed, edited] : cases)
+    {
+        SCOPED_TRACE(attributes + ": " + edited);
+        repository_.commitAll(writes(".gitattributes", "/d/? " + attributes + '\n') +
+                                  writesEach({"d/f", "d/g"}, committed),
+                              "converted");
+        makeBranch("topic", writes("d/f", "t\n") + removes("d/g"));
+        for (const std::string name : {"d/f", "d/g"})
+        {
+            SCOPED_TRACE(name);
+            repository_.write(name, edited);
+            expectRefused(lost(name));
+            EXPECT_EQ(repository_.read(name), edited);
+            EXPECT_NE(repository_.tryGit({"switch", "topic"}).exitStatus, 0);
+            repository_.remove(name);
+            repository_.git({"checkout", "--quiet", "--", name});
+        }
+        repository_.git({"branch", "--quiet", "-D", "topic"});
+    }
+}
+
+/// libgit2 takes the file for what it would write, which has other line ends.
+TEST_F(OverlookedEdits, WithOtherLineEndsThanTheTargetsAreKept)
+{
+    repository_.commitAll(writes(".gitattributes", "/d/f text\n") + writes("d/f", "a\nb\n"),
+                          "converted");
+    makeBranch("topic", writes("d/f", "t\n"));
+    repository_.write("d/f", "t\r\n");
+    expectRefused(lost("d/f"));
+    EXPECT_NE(repository_.tryGit({"switch", "topic"}).exitStatus, 0);
+    repository_.write("d/f", "t\n");
+    expectSwitches();
+    EXPECT_THAT(status(), IsEmpty());
+}
+
+/// As git takes them for unchanged: with line ends converted, copied, and with other times.
+TEST_F(OverlookedEdits, AreNotConvertedFilesOfTheirRecordedSize)
+{
+    const std::vector<Change> changes{
+        [](const GitRepository & /*copy*/) {},
+        setsAnOldTime("d/f"),
+        removes("d/f") + runsGit({"checkout", "--quiet", "--", "d/f"}),
+        removes("d/f") + writes("d/f", "f\r\nf\r\n"),
+        writes("d/f", "f\nf\n") + runsGit({"add", "--renormalize", "d/f"}),
+        runsGit({"rm", "--quiet", "--cached", "d/f"}) + runsGit({"reset", "--quiet"}),
+        runsGit({"read-tree", "HEAD"})};
+    repository_.git({"config", "core.autocrlf", "true"});
+    repository_.commitAll(writes("d/f", "f\r\nf\r\n"), "converted");
+    makeBranch("topic", writes("d/f", "t\r\n"));
+    for (std::size_t i = 0; i < changes.size(); ++i)
+    {
+        SCOPED_TRACE(i);
+        changes[i](repository_);
+        const GitRepository twin = repository_.copyTo(folder() / "twin");
+        twin.git({"switch", "--quiet", "topic"});
+        expectSwitches();
+        EXPECT_EQ(repository_.read("d/f"), twin.read("d/f"));
+        EXPECT_THAT(status(), IsEmpty());
+        repository_.git({"switch", "--quiet", "main"});
+    }
 }
 
 TEST_F(OverlookedEdits, OfFilesThatCannotBeReadAreKept)
