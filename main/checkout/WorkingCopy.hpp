@@ -112,9 +112,10 @@ class WorkingCopy
     [[nodiscard]] bool isIgnoredByLibGit2(const std::string &name) const;
     /// Returns true if libgit2 ignores the name, and Git may not.
     bool isFalselyIgnored(const std::string &name) const;
-    /// Returns true if only git can tell what it would store: the file has a filter of its own, or
-    /// another encoding in the working tree. See isEdited.
-    [[nodiscard]] bool isConvertedByGit(const std::string &name) const;
+    /// Returns true if only git can tell what it would store: a filter with a command is configured
+    /// for the file, or it has another encoding than UTF-8 in the working tree. See isEdited.
+    /// git_repository_config_snapshot, git_config_get_string.
+    [[nodiscard]] bool isConvertedByGit(const std::string &name);
     /// Returns true if the content of the file, link or folder differs from its entry in the index.
     /// A missing file does not differ.
     bool isEdited(const git_index_entry &entry);
@@ -132,6 +133,7 @@ class WorkingCopy
     git_object_t typeInHead(const std::string &name) const;
     const Way &findWay(const std::string &name);
     Way wayInto(const std::string &folder, const Way &above) const;
+    bool runsFilter(const std::string &filter);
     git_oid idOf(const std::string &name, Standing standing) const;
     git_oid idOfFile(const std::string &name, const std::string &nameForFilters) const;
 
@@ -143,6 +145,8 @@ class WorkingCopy
     OwnedHandle<git_tree> head_;
     const Way wayToRoot_{};
     std::unordered_map<std::string, Way> ways_;
+    /// The filters that were asked for, and whether each has a command.
+    std::unordered_map<std::string, bool> filters_;
     /// The folder that was looked at last, and the way to it; null for none.
     std::string folder_;
     const Way *wayToFolder_ = nullptr;

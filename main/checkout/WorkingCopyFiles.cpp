@@ -2,12 +2,13 @@
 // WorkingCopy: what is in single files, and whether they are ignored.
 #include "main/checkout/WorkingCopy.hpp"
 
-#include <cstring>
-
 #include <fcntl.h>
+#include <git2/config.h>
+#include <git2/errors.h>
 #include <git2/ignore.h>
 #include <git2/odb.h>
 #include <git2/repository.h>
+#include <strings.h>
 #include <sys/stat.h>
 #include <unistd.h>
 
@@ -22,6 +23,31 @@ namespace
 {
 
 constexpr const char *withoutFilters = "";
+
+/// Returns the text of an attribute's value, empty for an attribute without one.
+std::string textOf(const char *value)
+{
+    return git_attr_value(value) == GIT_ATTR_VALUE_STRING ? value : "";
+}
+
+/// As git compares names of encodings.
+bool isUtf8(const std::string &encoding)
+{
+    return ::strcasecmp(encoding.c_str(), "UTF-8") == 0 ||
+           ::strcasecmp(encoding.c_str(), "UTF8") == 0;
+}
+
+bool hasText(git_config *config, const std::string &setting)
+{
+    const char *value = nullptr;
+    const GitResult<void> found = call(git_config_get_string, &value, config, setting.c_str());
+    if (found.has_error() && found.error().getCode() == GIT_ENOTFOUND)
+    {
+        return false;
+    }
+    check(found);
+    return *value != '\0';
+}
 
 } // namespace
 
@@ -47,14 +73,32 @@ bool WorkingCopy::isIgnoredByLibGit2(const std::string &name) const
     return ignored != 0;
 }
 
-bool WorkingCopy::isConvertedByGit(const std::string &name) const
+bool WorkingCopy::isConvertedByGit(const std::string &name)
 {
-    const auto has = [&](const char *attribute)
+    const std::string encoding = textOf(readAttribute(repository_, name, "working-tree-encoding"));
+    if (!encoding.empty() && !isUtf8(encoding))
     {
-        const char *const value = readAttribute(repository_, name, attribute);
-        return git_attr_value(value) == GIT_ATTR_VALUE_STRING && std::strcmp(value, "ident") != 0;
-    };
-    return has("filter") || has("working-tree-encoding");
+        return true;
+    }
+    const std::string filter = textOf(readAttribute(repository_, name, "filter"));
+    return !filter.empty() && runsFilter(filter);
+}
+
+/// Returns true if git runs a command to store the files of a filter. Otherwise, it stores what
+/// they hold.
+bool WorkingCopy::runsFilter(const std::string &filter)
+{
+    const auto known = filters_.find(filter);
+    if (known != filters_.end())
+    {
+        return known->second;
+    }
+    const OwnedHandle<git_config> config =
+        acquire<git_config>(git_repository_config_snapshot, repository_).value();
+    const std::string section = "filter." + filter;
+    const bool runs =
+        hasText(config.get(), section + ".clean") || hasText(config.get(), section + ".process");
+    return filters_.emplace(filter, runs).first->second;
 }
 
 bool WorkingCopy::isEdited(const git_index_entry &entry)

@@ -3,6 +3,7 @@
 
 #include <array>
 #include <cstddef>
+#include <filesystem>
 #include <string>
 #include <vector>
 
@@ -110,10 +111,57 @@ TEST_F(OverlookedEdits, AreNotOtherInodesOfFilteredFiles)
     repository_.commitAll(writes(".gitattributes", "/d/f filter=large\n"), "attributes");
     repository_.commitAll(writes("d/f", "large\n"), "filtered");
     makeBranch("topic", writes("d/f", "other\n"));
+    for (const std::string command : {"clean", "process"})
+    {
+        SCOPED_TRACE(command);
+        repository_.git({"config", "filter.large.clean", "tr a-z A-Z"});
+        repository_.git({"checkout", "--quiet", "--force", "main"});
+        setsAnOldTime("d/f")(repository_);
+        repository_.git({"update-index", "--refresh"});
+        writesAtTheSameTime("d/f", "large\n")(repository_);
+        repository_.git({"config", "--unset", "filter.large.clean"});
+        repository_.git({"config", "filter.large." + command, "tr a-z A-Z"});
+        expectSwitches();
+        repository_.git({"config", "--unset", "filter.large." + command});
+    }
+}
+
+TEST_F(OverlookedEdits, AreNotOtherInodesOfFilesWithAnotherEncoding)
+{
+    repository_.commitAll(writes(".gitattributes", "/d/f working-tree-encoding=latin1\n") +
+                              writes("d/f", "\xE4\n"),
+                          "encoded");
+    makeBranch("topic", writes("d/f", "\xF6\n"));
     setsAnOldTime("d/f")(repository_);
     repository_.git({"update-index", "--refresh"});
-    writesAtTheSameTime("d/f", "large\n")(repository_);
+    writesAtTheSameTime("d/f", "\xE4\n")(repository_);
     expectSwitches();
+}
+
+/// git stores what these files hold.
+TEST_F(OverlookedEdits, OfFilesThatNoCommandConvertsAreKept)
+{
+    repository_.git({"config", "filter.empty.clean", ""});
+    repository_.git({"config", "filter.empty.process", ""});
+    repository_.git({"config", "filter.smudged.smudge", "cat"});
+    repository_.git({"config", "filter.lax.required", "false"});
+    makeBranch("topic", writes("d/f", "t\n"));
+    setsAnOldTime("d/f")(repository_);
+    repository_.git({"update-index", "--refresh"});
+    // git does not notice another time of the inode within a second.
+    repository_.write("n", "M\n");
+    setsAnOldTime("n")(repository_);
+    std::filesystem::rename(repository_ / "n", repository_ / "d/f");
+    for (const std::string attribute :
+         {"filter", "filter=", "filter=unknown", "filter=empty", "filter=smudged", "filter=lax",
+          "working-tree-encoding=UTF-8", "working-tree-encoding=utf-8",
+          "working-tree-encoding=Utf8", "working-tree-encoding="})
+    {
+        SCOPED_TRACE(attribute);
+        repository_.write(".git/info/attributes", "/d/f " + attribute + '\n');
+        expectRefused(lost("d/f"));
+        EXPECT_NE(repository_.tryGit({"switch", "topic"}).exitStatus, 0);
+    }
 }
 
 /// As on a file system without symbolic links. libgit2 refuses these itself, edited or not.
