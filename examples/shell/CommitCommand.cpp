@@ -8,6 +8,7 @@
 #include "Output.hpp"
 #include "Session.hpp"
 #include "commands.hpp"
+#include "convertedFiles.hpp"
 #include "failures.hpp"
 #include "fl/i18n/convert.hpp"
 #include "mergeLeftovers.hpp"
@@ -36,6 +37,21 @@ void refuseConflicts(const FileStateMap &states)
             "is right, and mark it with \"vclink-shell resolved\". With --as-is the commit\n"
             "takes them as they are, with any conflict markers.",
             listNames(conflicts)));
+    }
+}
+
+/// @throws ShellFailure if the commit would store what is on the disk in place of what git stores
+void refuseUnconverted(CMAdapter &adapter, const FileStateMap &states)
+{
+    const FileStateMap unconverted = findUnconverted(adapter, states);
+    if (!unconverted.empty())
+    {
+        throw ShellFailure(
+            say("Nothing was committed, because git converts these files before it stores them, "
+                "and vclink-shell\ncannot:%1%\nUse \"git commit -a\". If you have not changed "
+                "them, \"git status\" is enough: then commit again. With\n--as-is the commit "
+                "stores what is on the disk.",
+                listNames(unconverted)));
     }
 }
 
@@ -79,8 +95,9 @@ class CommitCommand : public Command
         line.add_flag("--allow-empty-message", mayBeSilent_, say("Commit with an empty message"));
         line.add_flag(
             "--as-is", takesAll_,
-            say("Commit files in conflict as they are, conflict markers included; commit "
-                "also\nduring a rebase, a bisection or a series of picked commits, which ends it"));
+            say("Commit files as they are on the disk, also with conflict markers, or if git would "
+                "convert\nthem by a filter; commit also during a rebase, a bisection or a series "
+                "of picked\ncommits, which ends it"));
         line.footer(say("Commits all changes to tracked files, staged or not, and all that was "
                         "added or removed. Concludes a\nmerge that is under way. The author comes "
                         "from git's settings user.name and user.email; if they are\nnot set, from "
@@ -101,6 +118,7 @@ class CommitCommand : public Command
         {
             refuseHalfWay(adapter);
             refuseConflicts(states);
+            refuseUnconverted(adapter, states);
         }
         if (!mayBeEmpty_)
         {

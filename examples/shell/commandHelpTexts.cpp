@@ -79,12 +79,16 @@ constexpr Translation commandHelpRows[] = {
      "変更がなくてもコミットする"},
     {"Commit with an empty message", "Mit einer leeren Nachricht committen",
      "空のメッセージでコミットする"},
-    {"Commit files in conflict as they are, conflict markers included; commit also\nduring a "
-     "rebase, a bisection or a series of picked commits, which ends it",
-     "Dateien in Konflikt committen, wie sie sind, samt Markierungen, und\nauch mitten in einem "
-     "Rebase, einer Bisection oder einer Reihe von\nCherry-Picks, was sie beendet",
-     "競合しているファイルをマーカーも含めてそのままコミットする。リベース、\n二分探索、連続したチ"
-     "ェリーピックの途中でも行い、それを終わらせる"},
+    {"Commit files as they are on the disk, also with conflict markers, or if git would convert\n"
+     "them by a filter; commit also during a rebase, a bisection or a series of picked\ncommits, "
+     "which ends it",
+     "Dateien committen, wie sie auf der Platte sind, auch mit Konfliktmarkierungen, und wenn\ngit "
+     "sie durch einen Filter umwandeln würde; auch mitten in einem Rebase, einer Bisection\noder "
+     "einer Reihe von Cherry-Picks committen, was sie beendet",
+     "ファイルをディスク上のままコミットする。競合マーカーがある場合や、git "
+     "がフィルターで変換する場合も含む。\nリベース、二分探索、連続したチェリーピックの途中でも行い"
+     "、そ"
+     "れを終わらせる"},
     {"Commits all changes to tracked files, staged or not, and all that was added or removed. "
      "Concludes a\nmerge that is under way. The author comes from git's settings user.name and "
      "user.email; if they are\nnot set, from USER or LOGNAME and the machine's name.",

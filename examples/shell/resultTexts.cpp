@@ -38,6 +38,18 @@ constexpr Translation resultRows[] = {
      "次のファイルが競合しているため、何もコミットされませんでした:%1%"
      "\nそれぞれを正しく編集し、\"vclink-shell resolved\" で解決済みにしてください。--as-is "
      "を付けると、\n競合マーカーも含めてそのままコミットします。"},
+    {"Nothing was committed, because git converts these files before it stores them, and "
+     "vclink-shell\ncannot:%1%\nUse \"git commit -a\". If you have not changed them, \"git "
+     "status\" is enough: then commit again. With\n--as-is the commit stores what is on the disk.",
+     "Nichts wurde committet, weil git diese Dateien umwandelt, bevor es sie speichert, und "
+     "vclink-shell das\nnicht kann:%1%\nBenutzen Sie \"git commit -a\". Haben Sie sie nicht "
+     "geändert, genügt \"git status\": Committen Sie dann noch\neinmal. Mit --as-is speichert der "
+     "Commit, was auf der Platte ist.",
+     "次のファイルは保存前に git が変換しますが、vclink-shell "
+     "にはできないため、何もコミットされませんでした:%1%"
+     "\n\"git commit -a\" を使ってください。変更していないファイルなら、\"git status\" "
+     "を実行してから\nもう一度コミットしてください。--as-is "
+     "を付けると、ディスク上の内容をそのまま保存します。"},
     {"Nothing was committed: no tracked file has changed.",
      "Nichts wurde committet: Keine Datei, die Git kennt, ist geändert.",
      "何もコミットされませんでした。追跡されているファイルに変更がありません。"},

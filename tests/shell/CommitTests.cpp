@@ -1,4 +1,8 @@
 // SPDX-License-Identifier: MIT
+#include <array>
+#include <ctime>
+
+#include <fcntl.h>
 #include <gmock/gmock.h>
 #include <sys/stat.h>
 #include <unistd.h>
@@ -108,6 +112,62 @@ TEST_F(ShellCommit, IsRefusedWhileFilesAreInConflict)
               "  a\n"
               "Edit each until it is right, and mark it with \"vclink-shell resolved\". With "
               "--as-is the commit\ntakes them as they are, with any conflict markers.\n");
+}
+
+/// Also those that nobody has changed, and those that are as new as the index: their state is
+/// clean.
+TEST_F(ShellCommit, IsRefusedIfItWouldStoreFilesThatGitConverts)
+{
+    setIdentity();
+    repository_.git({"config", "filter.large.clean", "tr A-Z a-z"});
+    repository_.git({"config", "filter.large.smudge", "tr a-z A-Z"});
+    repository_.git({"config", "filter.smudged.smudge", "cat"});
+    repository_.write(".gitattributes", "*.large filter=large\n*.smudged filter=smudged\n"
+                                        "*.latin working-tree-encoding=latin1\n"
+                                        "*.utf working-tree-encoding=utf8\n");
+    const std::vector<std::string> names{"folder/b.large", "new.large", "touched.large",
+                                         "u.latin",        "u.utf",     "v.smudged"};
+    const auto setTime = [&](const std::string &name, std::time_t time)
+    {
+        const std::array<timespec, 2> times{timespec{time, 0}, timespec{time, 0}};
+        ASSERT_EQ(::utimensat(AT_FDCWD, (repository_ / name).c_str(), times.data(), 0), 0);
+    };
+    for (const std::string &name : names)
+    {
+        repository_.write(name, "TEXT\n");
+        setTime(name, 1'000'000'000);
+    }
+    repository_.commitAll("converted");
+    const auto refuseWith = [&](const std::string &list)
+    {
+        EXPECT_EQ(refuse({"commit", "-m", "Work"}),
+                  "Nothing was committed, because git converts these files before it stores them, "
+                  "and vclink-shell\ncannot:\n" +
+                      list +
+                      "Use \"git commit -a\". If you have not changed them, \"git status\" is "
+                      "enough: then commit again. With\n--as-is the commit stores what is on the "
+                      "disk.\n");
+    };
+    repository_.write("a", "edited\n");
+    setTime("touched.large", 1'000'000'001);
+    refuseWith("  touched.large\n");
+    setTime("new.large", std::time(nullptr) + 1'000);
+    repository_.git({"status"});
+    refuseWith("  new.large\n");
+    setTime("new.large", 1'000'000'000);
+    repository_.git({"status"});
+    for (const std::string &name : names)
+        repository_.write(name, "EDIT\n");
+    refuseWith("  folder/b.large\n  new.large\n  touched.large\n  u.latin\n");
+    for (const std::string &name : names)
+        setTime(name, 1'000'000'002);
+    repository_.add();
+    succeed({"commit", "-m", "Staged by git"});
+    EXPECT_EQ(repository_.git({"show", "HEAD:new.large"}), "edit\n");
+    EXPECT_EQ(repository_.git({"show", "HEAD:v.smudged"}), "EDIT\n");
+    setTime("touched.large", 1'000'000'003);
+    succeed({"commit", "--as-is", "-m", "As it is"});
+    EXPECT_EQ(repository_.git({"show", "HEAD:touched.large"}), "EDIT\n");
 }
 
 TEST_F(ShellCommit, IsRefusedWithoutAMessageOrAChange)
