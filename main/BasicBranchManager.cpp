@@ -224,7 +224,7 @@ void BasicBranchManager::switchBranch(const BranchName &name)
     refuseUnwritableReflog(repository.get(), "HEAD");
     awaitUnlocked(repository.get(), "HEAD");
     check(git_checkout_tree, repository.get(), target.get(), &record);
-    watch.settleSubmodules();
+    watch.settle();
     lock.publish();
     // After the checkout, so that HEAD stays if the checkout fails.
     const char *const head = git_reference_name(branch.get());

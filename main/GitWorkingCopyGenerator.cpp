@@ -11,6 +11,7 @@
 #include "error/logging/ScopeTrace.hpp"
 #include "error/logging/logger.hpp"
 #include "fl/i18n/convert.hpp"
+#include "main/checkout/CloneWatch.hpp"
 #include "main/remote/SigpipeBlock.hpp"
 #include "options/GitCallbacks.hpp"
 #include "options/gitRecords.hpp"
@@ -59,9 +60,9 @@ void GitWorkingCopyGenerator::generate(const ustring &repositorySpecifier, const
     const std::string url = toGitString(repositorySpecifier);
     const std::string path = toGitString(sandboxRoot.string());
     const CloneOptions options = impl_->optionsFactory->makeCloneOptions();
-    const git_clone_options record = toGitCloneOptions(options, *impl_->callbacks);
+    git_clone_options record = toGitCloneOptions(options, *impl_->callbacks);
     const SigpipeBlock sigpipe;
-    // Needs no CheckoutWatch: libgit2 clones only into a new or an empty folder.
+    const CloneWatch watch(record);
     acquire<git_repository>(git_clone, url.c_str(), path.c_str(), &record).value();
 }
 

@@ -162,6 +162,7 @@ void CheckoutWatch::lookBeforeMerge(const git_oid *theirs)
                              found = judgeMerge(copy, change, after.get());
                              renamed.note(copy, change);
                              againstFolders.note(copy, change, after.get());
+                             attributes_.noteChange(change.path);
                              if (!staysFile(change))
                              {
                                  merged_.noteChange(copy, change);
@@ -218,8 +219,13 @@ Finding CheckoutWatch::judgeMerge(WorkingCopy &copy, const TreeChange &change,
                                : found;
 }
 
-void CheckoutWatch::settleSubmodules() const
+void CheckoutWatch::settle() const
 {
+    if (failure_ != nullptr)
+    {
+        std::rethrow_exception(failure_);
+    }
+    attributes_.settle(repository_);
     if (switched_.isEmpty() && merged_.isEmpty())
     {
         return;

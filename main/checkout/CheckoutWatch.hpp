@@ -2,6 +2,7 @@
 #pragma once
 
 #include <cstddef>
+#include <exception>
 #include <optional>
 #include <string>
 #include <vector>
@@ -12,6 +13,7 @@
 #include "error/errorUtil/OwnedHandle.hpp"
 #include "main/checkout/ClearedWay.hpp"
 #include "main/checkout/MergeSubmodules.hpp"
+#include "main/checkout/NewAttributes.hpp"
 #include "main/checkout/Obstacle.hpp"
 #include "main/checkout/PromisedContent.hpp"
 #include "main/checkout/RemadeFiles.hpp"
@@ -44,6 +46,8 @@ enum class CheckoutKind
 /// HEAD moves later, the checkout still compares with the HEAD that was read, so that files of the
 /// new commit are not deleted.
 ///
+/// Also makes libgit2 write all files with the new attributes; see NewAttributes.
+///
 /// Calls the record's own notification first, so that a cancellation comes before a refusal. It
 /// receives a refused file like any other conflict. The record's progress callback shows when
 /// libgit2 begins to write, and is called too.
@@ -69,8 +73,9 @@ class CheckoutWatch
     /// Sets the entries of submodules in the index to those of the target or the merge, and keeps
     /// their folders. Writes the index if something changes. Call it after the checkout or the
     /// merge.
-    /// @throws LibGit2Exception
-    void settleSubmodules() const;
+    /// @throws LibGit2Exception, also if the checkout has written files with other attributes than
+    /// those of the target
+    void settle() const;
 
     /// Returns true if the watch has refused the checkout at one of its notifications, so that
     /// libgit2 has written nothing.
@@ -96,6 +101,7 @@ class CheckoutWatch
     WorkingCopy &lookAtWorkingCopy();
     void noteUntracked(const CheckoutNotice &notice);
     Finding clearAll(const CheckoutNotice &notice);
+    void applyAttributes() noexcept;
     void refuse(const Obstacle &obstacle);
 
     CheckoutKind kind_;
@@ -123,6 +129,9 @@ class CheckoutWatch
     std::string replaced_;
     ClearedWay cleared_;
     RemadeFiles remade_;
+    NewAttributes attributes_;
+    /// What libgit2 cannot be told before it writes.
+    std::exception_ptr failure_;
     /// A buffer for what is looked at for each file.
     std::string path_;
 };

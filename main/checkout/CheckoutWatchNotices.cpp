@@ -58,9 +58,26 @@ void CheckoutWatch::passProgress(const char *path, std::size_t completed, std::s
     auto &watch = *static_cast<CheckoutWatch *>(payload);
     watch.remade_.remove();
     watch.cleared_.removeNoted();
+    if (watch.attributes_.isPending())
+    {
+        watch.applyAttributes();
+    }
     if (watch.progress_ != nullptr)
     {
         watch.progress_(path, completed, total, watch.progressPayload_);
+    }
+}
+
+void CheckoutWatch::applyAttributes() noexcept
+{
+    try
+    {
+        attributes_.apply(repository_);
+    }
+    catch (...)
+    {
+        // libgit2 cannot be stopped here.
+        failure_ = std::current_exception();
     }
 }
 
@@ -80,6 +97,7 @@ Finding CheckoutWatch::noteOverwritten(const CheckoutNotice &notice)
     }
     const bool isExecutable = notice.target->mode == GIT_FILEMODE_BLOB_EXECUTABLE;
     const std::string reason = remade_.note(path_.assign(root_).append(notice.path), isExecutable);
+    attributes_.note(path_, *notice.target);
     return reason.empty()
                ? Finding()
                : Obstacle{notice.path, "the file '" + std::string(notice.path) + "' " + reason};

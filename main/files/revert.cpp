@@ -193,6 +193,7 @@ void GitAdapter::revertFiles(const std::vector<upath> &files)
         lock.discard();
     }
     check(restored);
+    watch.settle();
     lock.publish();
 }
 

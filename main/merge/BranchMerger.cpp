@@ -161,7 +161,7 @@ void BranchMerger::fastForward(git_repository *repository, git_annotated_commit 
     // The branch as it was read: libgit2 detects a later change when it moves the branch.
     headThen.refuseMoved(repository);
     check(git_checkout_tree, repository, target.get(), &record);
-    watch.settleSubmodules();
+    watch.settle();
     lock.publish();
     // After the checkout, so that the branch stays if the checkout fails.
     retryWhileLocked(

@@ -143,7 +143,7 @@ void BranchMerger::threeWayMerge(const BranchName &name, git_repository *reposit
     marker.emplace(repository, sides);
     check(git_merge, repository, heads, 1U, &mergeRecord, &checkoutRecord);
     restoreMergeHead(repository, sides.theirs);
-    watch.settleSubmodules();
+    watch.settle();
     const OwnedHandle<git_index> index = getRepositoryIndex(repository);
     if (git_index_has_conflicts(index.get()) != 0)
     {

@@ -164,6 +164,20 @@ void makeReplacedFolder(GitRepository &repository)
     repository.makeBranch("topic", removes("folder") + writes("folder", "theirs\n"));
 }
 
+void makeChangedAttributes(GitRepository &repository)
+{
+    makePlain(repository);
+    repository.commitAll(writes(".gitattributes", "* -text\n"), "attributes");
+    repository.makeBranch("topic", writes(".gitattributes", "* text eol=crlf\n") +
+                                       writes("added", "added\n"));
+}
+
+void makeDivergedAttributes(GitRepository &repository)
+{
+    makeChangedAttributes(repository);
+    repository.commitAll(writes("other", "ours\n"), "ours");
+}
+
 void makeBrokenLink(GitRepository &repository)
 {
     makeBranches(repository);

@@ -52,6 +52,10 @@ void makeDiverged(GitRepository &repository);
 void makeHidden(GitRepository &repository);
 /// Diverged, and an ignored folder where "topic" adds a file.
 void makeIgnored(GitRepository &repository);
+/// "topic" changes ".gitattributes" and adds "added".
+void makeChangedAttributes(GitRepository &repository);
+/// The same, with another change on main.
+void makeDivergedAttributes(GitRepository &repository);
 /// "topic" has the submodule "come" and lacks "gone", which main has, and changes "file". The
 /// folders of both are there.
 void makeSubmodules(GitRepository &repository);

@@ -173,6 +173,7 @@ class LibGit2Recorder
     void add(const LibGit2Call &call);
     void giveOut(const char *function, const void *handle);
     void takeBack(const char *function, const void *handle);
+    void forgetHandlesOf(std::string_view function);
     /// The fault of a call that is noted already.
     std::optional<LibGit2Fault> findFault(std::string_view function) const;
 

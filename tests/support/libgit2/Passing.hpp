@@ -58,6 +58,8 @@ class Passing
         return recorder_->findFault(function_);
     }
     void giveOut(const void *handle) const;
+    /// Takes back what a callback of this call has made for libgit2: the repository of a clone.
+    void takeBackFromCallbacks() const;
     /// Leaves the error record of a failing call.
     static void setError();
     /// Leaves earlierText after a call that has succeeded, unless libgit2 has left a text itself.

@@ -102,6 +102,7 @@ template <class Result, class... Arguments> struct Shim<Result(Arguments...)>
         if (!fault || fault->when == When::After)
         {
             code = answer(passing, real, arguments...);
+            passing.takeBackFromCallbacks();
             const void *const handle = givenOut(arguments...);
             if (handle != nullptr)
                 passing.giveOut(handle);
