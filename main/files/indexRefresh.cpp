@@ -19,6 +19,7 @@
 #include "error/errorUtil/GitResult.hpp"
 #include "error/errorUtil/raiseSystemError.hpp"
 #include "main/files/EmptiedFiles.hpp"
+#include "main/files/IdentifiedFiles.hpp"
 #include "util/path/foldersAbove.hpp"
 #include "util/repository/repository.hpp"
 
@@ -116,6 +117,7 @@ void refreshIndex(git_repository *repository, git_index *index, const ChangedFil
     held.holdLeftOut(index);
     check(git_index_update_all, index, nullptr, nullptr, nullptr);
     held.giveBack(index);
+    stageIdentifiedFiles(repository, index, changed.files());
     if (git_index_entrycount(index) < countBefore)
     {
         const OwnedHandle<git_index> before = openIndex(git_index_path(index));

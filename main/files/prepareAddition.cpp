@@ -9,7 +9,6 @@
 #include <git2/index.h>
 
 #include "error/errorUtil/GitResult.hpp"
-#include "main/files/ChangedFiles.hpp"
 #include "main/files/EmptiedFiles.hpp"
 #include "main/files/ListedFiles.hpp"
 #include "main/files/stageChangedFiles.hpp"
@@ -17,13 +16,13 @@
 namespace vclink::git
 {
 
-void prepareAddition(git_repository *repository, git_index *index, const git_strarray &listed,
-                     HeldEntries &held)
+std::vector<ChangedFile> prepareAddition(git_repository *repository, git_index *index,
+                                         const git_strarray &listed, HeldEntries &held)
 {
     const ChangedFiles changed(repository, index);
     if (changed.files().empty())
     {
-        return;
+        return {};
     }
     const ListedFiles names(index, listed);
     std::vector<ChangedFile> toStage;
@@ -37,6 +36,7 @@ void prepareAddition(git_repository *repository, git_index *index, const git_str
     {
         held.hold(index, file.path);
     }
+    return toStage;
 }
 
 } // namespace vclink::git

@@ -1,9 +1,12 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include <vector>
+
 #include <git2/strarray.h>
 #include <git2/types.h>
 
+#include "main/files/ChangedFiles.hpp"
 #include "main/files/HeldEntries.hpp"
 
 namespace vclink::git
@@ -13,8 +16,9 @@ namespace vclink::git
 /// Stages the listed ones by their paths as far as possible, in memory, and holds the others.
 /// git_pathspec_matches_path.
 /// @param held to be given back afterwards
+/// @return the listed ones
 /// @throws LibGit2Exception
-void prepareAddition(git_repository *repository, git_index *index, const git_strarray &listed,
-                     HeldEntries &held);
+std::vector<ChangedFile> prepareAddition(git_repository *repository, git_index *index,
+                                         const git_strarray &listed, HeldEntries &held);
 
 } // namespace vclink::git

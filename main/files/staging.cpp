@@ -7,6 +7,7 @@
 #include "error/raise.hpp"
 #include "fl/filesystem/operations.hpp"
 #include "main/files/GitAdapter.hpp"
+#include "main/files/IdentifiedFiles.hpp"
 #include "main/files/foldersInIndex.hpp"
 #include "main/files/otherCase.hpp"
 #include "main/files/prepareAddition.hpp"
@@ -106,10 +107,12 @@ void GitAdapter::addToIndex(const std::vector<upath> &files)
     const PathspecArray pathspec = makeFilePathspec(files, root_);
     refuseOtherCase(index.get(), pathspec.array());
     HeldEntries held;
-    prepareAddition(repository.get(), index.get(), pathspec.array(), held);
+    const std::vector<ChangedFile> changed =
+        prepareAddition(repository.get(), index.get(), pathspec.array(), held);
     check(git_index_add_all, index.get(), getArrayPointer(pathspec), GIT_INDEX_ADD_DEFAULT,
           acceptAllPaths, this);
     held.giveBack(index.get());
+    stageIdentifiedFiles(repository.get(), index.get(), changed);
     takeOutBelowFiles(index.get(), pathspec);
     writeIndex(index.get());
     lock.publish();

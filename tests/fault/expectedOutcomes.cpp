@@ -123,6 +123,9 @@ std::vector<Tolerance> tolerancesOfCommits(const std::string &operation, const s
         // So does the addition.
         {"markResolved", "git_diff_index_to_workdir", any, any, normal},
         {"markResolved", "git_index_add_bypath", any, any, normal},
+        // The content that an id in a file names can be in another repository.
+        {"commitIdentified", "git_odb_read", any, GIT_ENOTFOUND, normal},
+        {"addFilesIdentified", "git_odb_read", any, GIT_ENOTFOUND, normal},
         // The text of the failure is the injected one then.
         {"commit", "git_error_set_str", any, any, failure(GIT_ERROR, GIT_ERROR_OS, injectedText)},
     };

@@ -100,6 +100,14 @@ void makeEmptied(GitRepository &repository)
     repository.write("new", "new\n");
 }
 
+void makeIdentified(GitRepository &repository)
+{
+    repository.write(".gitattributes", "* text ident\n");
+    makePlain(repository);
+    const std::string ofNoContent(40, '1');
+    writesEach({"file", "new"}, "$Id: " + ofNoContent + " $\r\n$Id: 2$\r\n")(repository);
+}
+
 void makeUnreadable(GitRepository &repository)
 {
     makePlain(repository);

@@ -24,6 +24,9 @@ void makeAnonymous(GitRepository &repository);
 void makeSparse(GitRepository &repository);
 /// Plain under line-end conversion, "file" and "other" empty now, "new" unversioned.
 void makeEmptied(GitRepository &repository);
+/// Plain with the attribute `ident` and line-end conversion, and several ids in "file" and "new",
+/// which is unversioned.
+void makeIdentified(GitRepository &repository);
 /// Plain, and a link to itself in the place of "sub", so that "sub/inside" can't be looked at.
 void makeUnreadable(GitRepository &repository);
 /// Plain, and "file" staged as a link.

@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: MIT
+#include <chrono>
 #include <filesystem>
 #include <memory>
 #include <string>
@@ -169,6 +170,28 @@ TEST_F(ThreeWayMerge, ShowsItsProgress)
     EXPECT_THAT(interactor_->progress.calls,
                 ElementsAre(ProgressCall(0.0), ProgressCall(1.0),
                             ProgressCall(ustring(u"Checking out theirs"))));
+}
+
+/// libgit2 would store `$Id$x`, because it has replaced the word by an id as it wrote the file.
+TEST_F(ThreeWayMerge, StoresWordsThatBeginLikeAnId)
+{
+    const std::string words = "$Idle = $x;\n$Id: one\ntwo$\n";
+    repository_.commitAll(
+        [&](const GitRepository &copy)
+        {
+            copy.write(".gitattributes", "* ident\n");
+            copy.write("file", words);
+        },
+        "words");
+    makeBranch("topic", writes("file", words + "theirs\n"));
+    repository_.commitAll(writes("ours", "x"), "on main");
+    // libgit2 takes a file that is as old as the index for changed.
+    const auto past = std::filesystem::file_time_type::clock::now() - std::chrono::hours(1);
+    std::filesystem::last_write_time(repository_ / "file", past);
+    repository_.git({"update-index", "--refresh"});
+    const MergeOutcome expected = outcomeByGit("topic");
+    EXPECT_EQ(outcomeByLibrary("topic").tree, expected.tree);
+    EXPECT_EQ(repository_.git({"show", "HEAD:file"}), words + "theirs\n");
 }
 
 /// Whatever the host's factory gives, and also files that it does not touch. Changed files make it
