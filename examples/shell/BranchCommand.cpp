@@ -106,6 +106,7 @@ class BranchCommand : public Command
         if (deletes_)
         {
             refuseToDelete(session.adapter(), *manager, name);
+            refuseUnreadable(name, tip);
         }
         const bool mayLoseCommits = deletes_ && !isMerged(session.adapter(), tip);
         try
@@ -158,6 +159,19 @@ class BranchCommand : public Command
         refuseNeeded(adapter, name);
     }
 
+    /// @param tip of the branch, empty if it can't be read
+    /// @throws ShellFailure in that case: no way back could be named
+    static void refuseUnreadable(const std::string &name, const std::string &tip)
+    {
+        if (tip.empty())
+        {
+            throw ShellFailure(say("Nothing was deleted: the commit of '%1%' can't be read, so "
+                                   "there would be no way back. To\ndelete the branch "
+                                   "nevertheless, use \"git branch -D %2%\".",
+                                   showName(name), quoteForShell(name)));
+        }
+    }
+
     /// @throws ShellFailure if a working copy has the branch checked out, or returns to it
     static void refuseNeeded(CMAdapter &adapter, const std::string &name)
     {
@@ -191,6 +205,11 @@ class BranchCommand : public Command
         if (findRevision(manager, start() + "^{commit}"))
         {
             return;
+        }
+        if (isUnreadable(manager, start()))
+        {
+            throw ShellFailure(
+                say("No branch was made: the commit of '%1%' can't be read.", showName(start())));
         }
         if (start() == "HEAD")
         {

@@ -36,6 +36,11 @@ void refuseOtherThanCommits(const git::BranchManager &manager, const std::string
                             const std::optional<std::string> &id)
 {
     const std::optional<std::string> commit = findRevision(manager, name + "^{commit}");
+    if (!commit && isUnreadable(manager, name))
+    {
+        throw ShellFailure(
+            say("Nothing was merged: the commit of '%1%' can't be read.", showName(name)));
+    }
     if (!commit)
     {
         throw ShellFailure(

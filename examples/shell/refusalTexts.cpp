@@ -275,6 +275,12 @@ constexpr Translation refusalRows[] = {
      "Nichts wurde zusammengeführt: '%1%' ist ein annotierter Tag.",
      "何もマージされませんでした。'%1%' は注釈付きのタグです。"},
     {"Nothing was deleted. %1%", "Nichts wurde gelöscht. %1%", "何も削除されませんでした。%1%"},
+    {"Nothing was deleted: the commit of '%1%' can't be read, so there would be no way back. To\n"
+     "delete the branch nevertheless, use \"git branch -D %2%\".",
+     "Nichts wurde gelöscht: Der Commit von '%1%' kann nicht gelesen werden, also gäbe es keinen "
+     "Weg\nzurück. Um den Branch trotzdem zu löschen, benutzen Sie \"git branch -D %2%\".",
+     "何も削除されませんでした。'%1%' のコミットを読み取れないため、元に戻せなくなります。"
+     "それでもブランチを\n削除するには \"git branch -D %2%\" を使ってください。"},
     {"Nothing was deleted: '%1%' is checked out in %2%.\nSwitch to another branch there first.",
      "Nichts wurde gelöscht: '%1%' ist in %2% ausgecheckt.\nWechseln Sie dort zuerst zu einem "
      "anderen Branch.",

@@ -8,6 +8,30 @@
 
 namespace vclink::shell
 {
+namespace
+{
+
+bool isBeforeFirstCommit(const git::BranchManager &manager)
+{
+    constexpr int isUnborn = -9; // GIT_EUNBORNBRANCH
+    try
+    {
+        manager.getCurrentBranch();
+        return false;
+    }
+    catch (const git::LibGit2Exception &failure)
+    {
+        return failure.getError().getCode() == isUnborn;
+    }
+}
+
+bool has(const std::vector<git::BranchPointer> &branches, const std::string &reference)
+{
+    return std::find(branches.begin(), branches.end(), git::BranchPointer(reference)) !=
+           branches.end();
+}
+
+} // namespace
 
 std::optional<std::string> findRevision(const git::BranchManager &manager,
                                         const std::string &revision)
@@ -24,9 +48,23 @@ std::optional<std::string> findRevision(const git::BranchManager &manager,
 
 bool isBranch(const git::BranchManager &manager, const std::string &name)
 {
-    const std::vector<git::BranchPointer> branches = manager.getLocalBranches();
-    return std::find(branches.begin(), branches.end(), git::BranchPointer("refs/heads/" + name)) !=
-           branches.end();
+    return has(manager.getLocalBranches(), "refs/heads/" + name);
+}
+
+bool isUnreadable(const git::BranchManager &manager, const std::string &name)
+{
+    if (name == "HEAD")
+    {
+        // Throws if the repository can't be opened.
+        manager.getRepositoryState();
+        return !isBeforeFirstCommit(manager);
+    }
+    return isBranch(manager, name) || has(manager.getRemoteBranches(), "refs/remotes/" + name);
+}
+
+bool isHeadUnreadable(const git::BranchManager &manager)
+{
+    return !findRevision(manager, "HEAD^{tree}") && isUnreadable(manager, "HEAD");
 }
 
 } // namespace vclink::shell

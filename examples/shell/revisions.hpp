@@ -17,4 +17,14 @@ std::optional<std::string> findRevision(const git::BranchManager &manager,
 /// Whether there is a local branch of this short name.
 bool isBranch(const git::BranchManager &manager, const std::string &name);
 
+/// Whether a name that leads to no commit is that of a branch, also a remote-tracking one, whose
+/// commit can't be read. "HEAD" counts too, unless there is no commit yet.
+/// @throws git::LibGit2Exception if the repository can't be opened
+bool isUnreadable(const git::BranchManager &manager, const std::string &name);
+
+/// Whether the commit of HEAD or its tree can't be read. libgit2 then reports the states of a
+/// working copy before the first commit.
+/// @throws git::LibGit2Exception if the repository can't be opened
+bool isHeadUnreadable(const git::BranchManager &manager);
+
 } // namespace vclink::shell

@@ -137,6 +137,34 @@ TEST_F(ShellBranches, AreDeletedMergedOrNot)
     EXPECT_THAT(refs("heads"), ElementsAre("main"));
 }
 
+/// As in a clone that borrows objects from a repository that is away.
+TEST_F(ShellBranches, AreNotDeletedWhereTheirCommitCannotBeRead)
+{
+    makeBranch("topic", {{"a", "theirs\n"}});
+    const std::string tip = idOf("topic");
+    repository_.remove(".git/objects/" + tip.substr(0, 2) + '/' + tip.substr(2));
+    // libgit2 leaks the reference.
+    EXPECT_THAT(fail({"branch", "-d", "topic"}),
+                StartsWith("vclink-shell: Nothing was deleted: the commit of 'topic' can't be "
+                           "read, so there would be no way back. To\ndelete the branch "
+                           "nevertheless, use \"git branch -D topic\".\n"));
+    EXPECT_NE(repository_.tryGit({"branch", "-d", "topic"}).exitStatus, 0);
+    EXPECT_EQ(repository_.read(".git/refs/heads/topic"), tip + '\n');
+    repository_.git({"branch", "-D", "topic"});
+    EXPECT_THAT(refs("heads"), ElementsAre("main"));
+}
+
+TEST_F(ShellBranches, AreNotMadeAtACommitThatCannotBeRead)
+{
+    const std::string tip = head();
+    repository_.remove(".git/objects/" + tip.substr(0, 2) + '/' + tip.substr(2));
+    const std::string refusal = "No branch was made: the commit of '";
+    EXPECT_THAT(fail({"branch", "new"}), testing::HasSubstr(refusal + "HEAD' can't be read.\n"));
+    EXPECT_THAT(fail({"branch", "new", "main"}),
+                testing::HasSubstr(refusal + "main' can't be read.\n"));
+    EXPECT_THAT(refs("heads"), ElementsAre("main"));
+}
+
 TEST_F(ShellBranches, BeginAtNamesOnlyAndNameTheWayToOtherCommits)
 {
     repository_.git({"tag", "-a", "-m", "1", "v1"});

@@ -210,6 +210,16 @@ TEST_F(ShellMerge, DoesNotBeginBeforeTheFirstCommit)
     EXPECT_THAT(refuse({"merge", "other"}), HasSubstr("GIT_MERGE_ANALYSIS_UNBORN"));
 }
 
+TEST_F(ShellMerge, DoesNotBeginWhereTheCommitOfTheBranchCannotBeRead)
+{
+    makeBranch("other", {{"a", "theirs\n"}});
+    const std::string tip = repository_.line({"rev-parse", "other"});
+    repository_.remove(".git/objects/" + tip.substr(0, 2) + '/' + tip.substr(2));
+    EXPECT_THAT(fail({"merge", "other"}),
+                testing::StartsWith(
+                    "vclink-shell: Nothing was merged: the commit of 'other' can't be read.\n"));
+}
+
 TEST_F(ShellMerge, ThatCannotBeCommittedTellsHowToConcludeIt)
 {
     diverge();
