@@ -125,6 +125,7 @@ class StatusCommand : public Command
     {
         CMAdapter &adapter = session.workingCopy();
         const upath &root = adapter.getRootFolder();
+        refuseUnreadableHead(adapter);
         const FileStateMap states = paths_->empty() ? folderStates(adapter, root)
                                                     : collectStates(adapter, paths_->results());
         if (states.empty())

@@ -116,6 +116,7 @@ std::vector<NamedPath> lookUpFolders(CMAdapter &adapter, const std::vector<std::
 
 std::vector<NamedPath> lookUp(CMAdapter &adapter, const std::vector<std::string> &arguments)
 {
+    refuseUnreadableHead(adapter);
     const upath &root = adapter.getRootFolder();
     std::vector<NamedPath> paths;
     paths.reserve(arguments.size());

@@ -226,14 +226,25 @@ constexpr Translation refusalRows[] = {
      "が競合していて、解決するまで読み取れません。編集して、\n\"vclink-shell resolved\" "
      "で解決済みにしてください。"},
     {"The states of the files are not known: libgit2 can't read this working copy. \"git status\" "
-     "may\nsay why: an error in .gitmodules, a setting with an invalid value, or folders more than "
-     "100\nlevels deep.",
+     "may\nsay why: an error in .gitmodules, a setting with an invalid value, a tracked file that "
+     "you have no\npermission to read, or folders more than 100 levels deep.",
      "Die Zustände der Dateien sind nicht bekannt: libgit2 kann diese Arbeitskopie nicht lesen. "
      "\"git status\"\nkann sagen, warum: ein fehlerhaftes .gitmodules, eine Einstellung mit einem "
-     "unmöglichen Wert oder\nOrdner tiefer als 100 Ebenen.",
+     "unmöglichen Wert, eine\nversionierte Datei, die Sie nicht lesen dürfen, oder Ordner tiefer "
+     "als 100 Ebenen.",
      "ファイルの状態がわかりません。libgit2 がこの作業コピーを読み取れません。\"git status\" "
-     "で理由がわかることが\nあります: .gitmodules の誤り、設定の不正な値、100 "
-     "階層より深いフォルダーなど。"},
+     "で理由がわかることが\nあります: .gitmodules "
+     "の誤り、設定の不正な値、読み取り権限のない追跡対象のファイル、100 "
+     "階層より深い\nフォルダーなど。"},
+    {"The states of the files are not known: the commit of HEAD, or its tree, can't be read. \"git "
+     "fsck\" says\nwhat is missing. If the repository borrows objects from another one, make that "
+     "available again.",
+     "Die Zustände der Dateien sind nicht bekannt: Der Commit von HEAD oder dessen Tree kann nicht "
+     "gelesen\nwerden. \"git fsck\" sagt, was fehlt. Leiht sich das Repository Objekte von einem "
+     "anderen, machen Sie\ndieses wieder verfügbar.",
+     "ファイルの状態がわかりません。HEAD のコミットまたはそのツリーを読み取れません。\"git "
+     "fsck\" で何が\n欠けているかがわかります。別のリポジトリのオブジェクトを借りている場合は、"
+     "それを再び使えるようにしてください。"},
     {"No file here has a state: either Git ignores all files, or libgit2 can't read this working "
      "copy,\nfor example because a setting has an invalid value. \"git status\" may say which.",
      "Keine Datei hier hat einen Zustand: Entweder ignoriert Git alle Dateien, oder libgit2 kann "

@@ -91,7 +91,8 @@ std::string explainUnknownStates(CMAdapter &adapter)
     }
     return say("The states of the files are not known: libgit2 can't read this working copy. \"git "
                "status\" may\nsay why: an error in .gitmodules, a setting with an invalid value, "
-               "or folders more than 100\nlevels deep.");
+               "a tracked file that you have no\npermission to read, or folders more than 100 "
+               "levels deep.");
 }
 
 std::string explainNoStates()
@@ -126,8 +127,20 @@ fs::path sharedFolder(const fs::path &state)
     return std::getline(file, line) ? state / line : state;
 }
 
+void refuseUnreadableHead(CMAdapter &adapter)
+{
+    if (isHeadUnreadable(*git::BranchManager::create(adapter)))
+    {
+        throw ShellFailure(
+            say("The states of the files are not known: the commit of HEAD, or its tree, can't be "
+                "read. \"git fsck\" says\nwhat is missing. If the repository borrows objects from "
+                "another one, make that available again."));
+    }
+}
+
 FileStateMap wholeStates(CMAdapter &adapter)
 {
+    refuseUnreadableHead(adapter);
     FileStateMap states = folderStates(adapter, adapter.getRootFolder());
     if (states.empty())
     {

@@ -21,6 +21,10 @@ std::filesystem::path stateFolder(const std::filesystem::path &root);
 /// @param state of one of them, as from stateFolder(), or a bare repository
 std::filesystem::path sharedFolder(const std::filesystem::path &state);
 
+/// If the commit of HEAD or its tree can't be read, the back end reports each file as added.
+/// @throws ShellFailure in that case
+void refuseUnreadableHead(CMAdapter &adapter);
+
 /// The states of all files of the working copy.
 /// @throws ShellFailure if they can't be known
 FileStateMap wholeStates(CMAdapter &adapter);

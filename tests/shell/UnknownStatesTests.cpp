@@ -2,6 +2,7 @@
 #include <gmock/gmock.h>
 
 #include "ShellMergeFixture.hpp"
+#include "support/UnprivilegedUser.hpp"
 
 namespace vclink::test
 {
@@ -79,6 +80,50 @@ TEST_F(ShellUnknownStates, AreSaidToBeWhereFoldersAreTooDeep)
     repository_.write(deep + "/file", "");
     expectUnknown({"status"});
     expectUnknown({"commit", "-m", "Work"});
+}
+
+/// The time of the file is another one than in the index, so libgit2 reads it.
+TEST_F(ShellUnknownStates, AreSaidToBeWhereAFileMayNotBeRead)
+{
+    repository_.write("a", "A\n");
+    repository_.setMode("a", 0);
+    giveToUnprivilegedUser(repository_.path());
+    const std::string errors = runAsUnprivilegedUser([&] { return run({"status"}).errors; });
+    EXPECT_THAT(errors, StartsWith("vclink-shell: " + reason()));
+    EXPECT_THAT(errors, testing::HasSubstr("a tracked file that you have no\npermission to read"));
+}
+
+/// libgit2 has the same answer for a repository without a commit, and reports each file as added.
+TEST_F(ShellUnknownStates, AreSaidToBeWhereTheCommitOfHeadCannotBeRead)
+{
+    const auto check = [this](const std::string &revision)
+    {
+        const std::string id = repository_.line({"rev-parse", revision});
+        const std::string object = ".git/objects/" + id.substr(0, 2) + '/' + id.substr(2);
+        const std::string content = repository_.read(object);
+        repository_.remove(object);
+        EXPECT_NE(repository_.tryGit({"status"}).exitStatus, 0);
+        for (const std::vector<std::string> &arguments : {std::vector<std::string>{"status"},
+                                                          {"status", "a"},
+                                                          {"add", "new"},
+                                                          {"rm", "a"},
+                                                          {"revert", "a"},
+                                                          {"commit", "-m", "Work"}})
+        {
+            EXPECT_THAT(fail(arguments),
+                        testing::HasSubstr("The states of the files are not known: the commit of "
+                                           "HEAD, or its tree, can't be read."))
+                << arguments.front();
+        }
+        repository_.write(object, content);
+        EXPECT_EQ(run({"status"}).output, "modified\ta\nunversioned\tnew\n");
+    };
+    repository_.write("a", "edited\n");
+    repository_.write("new", "");
+    check("HEAD");
+    check("HEAD^{tree}");
+    repository_.git({"checkout", "--quiet", "--detach"});
+    check("HEAD");
 }
 
 TEST_F(ShellUnknownStates, AreSaidToBeBeforeTheFirstCommitToo)
