@@ -110,8 +110,8 @@ inline const char *nameOf(vclink::FileState state) noexcept
     return "unknown";
 }
 
-/// libgit2 can't read the working copy. A state query then returns no files and does not fail, so
-/// everything looks clean.
+/// libgit2 can't read the working copy, or the commit of HEAD. A state query then returns no files,
+/// so that everything looks clean, or each file as added. It does not fail.
 class StatesUnknown : public std::runtime_error
 {
   public:
@@ -120,25 +120,45 @@ class StatesUnknown : public std::runtime_error
     }
 };
 
+inline bool isBeforeFirstCommit(const vclink::git::BranchManager &branches)
+{
+    constexpr int unborn = -9; // GIT_EUNBORNBRANCH
+    try
+    {
+        branches.getCurrentBranch();
+        return false;
+    }
+    catch (const vclink::git::LibGit2Exception &failure)
+    {
+        return failure.getError().getCode() == unborn;
+    }
+}
+
+/// @throws StatesUnknown if the commit of HEAD or its tree can't be read
+inline bool hasFilesInHead(const vclink::git::BranchManager &branches)
+{
+    const std::string emptyTree = "4b825dc642cb6eb9a060e54bf8d69288fbee4904";
+    try
+    {
+        return branches.getRevision("HEAD^{tree}") != emptyTree;
+    }
+    catch (const vclink::git::LibGit2Exception &)
+    {
+        // Throws if the repository can't be opened.
+        (void)branches.getRepositoryState();
+        if (!isBeforeFirstCommit(branches))
+            throw StatesUnknown();
+        return false;
+    }
+}
+
 /// The states of all files, ignored ones left out.
 /// @throws StatesUnknown
 inline vclink::FileStateMap readStates(vclink::CMAdapter &adapter)
 {
+    const bool hasFiles = hasFilesInHead(*vclink::git::BranchManager::create(adapter));
     vclink::FileStateMap states = adapter.getFolderStates(adapter.getRootFolder());
-    if (!states.empty())
-        return states;
-    bool hasFiles = false;
-    try
-    {
-        const std::string emptyTree = "4b825dc642cb6eb9a060e54bf8d69288fbee4904";
-        const auto branches = vclink::git::BranchManager::create(adapter);
-        hasFiles = branches->getRevision("HEAD^{tree}") != emptyTree;
-    }
-    catch (const vclink::git::LibGit2Exception &)
-    {
-        // There is no commit yet.
-    }
-    if (hasFiles)
+    if (states.empty() && hasFiles)
         throw StatesUnknown();
     return states;
 }

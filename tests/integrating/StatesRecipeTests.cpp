@@ -6,11 +6,13 @@
 
 #include "fl/filesystem/path.hpp"
 #include "support/GitFixture.hpp"
+#include "support/WithoutLeakChecks.hpp"
 #include "support/adapterFor.hpp"
 #include "support/text.hpp"
 #include "vclink/CMAdapter.hpp"
 #include "vclink/FileStateMap.hpp"
 #include "vclink/git/BranchManager.hpp"
+#include "vclink/git/LibGit2Exception.hpp"
 
 // examples/integrating/states.cpp
 bool hasFilesInHead(const vclink::git::BranchManager &branches);
@@ -57,6 +59,27 @@ TEST_F(StatesRecipe, SaysThatTheyCannotBeKnown)
     repository_.commitAll("begin");
     repository_.git({"config", "core.ignorecase", "bogus"});
     EXPECT_FALSE(readStates(*adapter_).has_value());
+}
+
+/// libgit2 reports each file as added then.
+TEST_F(StatesRecipe, ThrowsWhereTheLastCommitCannotBeRead)
+{
+    repository_.write("file", "1\n");
+    repository_.commitAll("begin");
+    const std::string head = repository_.line({"rev-parse", "HEAD"});
+    repository_.remove(".git/objects/" + head.substr(0, 2) + '/' + head.substr(2));
+    // libgit2 leaks the reference.
+    const vclink::test::WithoutLeakChecks unchecked;
+    EXPECT_THROW(readStates(*adapter_), vclink::git::LibGit2Exception);
+}
+
+TEST_F(StatesRecipe, GivesStatesWhileHeadIsDetached)
+{
+    repository_.write("file", "1\n");
+    repository_.commitAll("begin");
+    repository_.git({"checkout", "--quiet", "--detach"});
+    EXPECT_TRUE(hasFiles());
+    EXPECT_TRUE(readStates(*adapter_).has_value());
 }
 
 TEST_F(StatesRecipe, TakesAnEmptyWorkingCopyAsOne)
