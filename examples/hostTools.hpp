@@ -2,6 +2,7 @@
 #pragma once
 
 #include <atomic>
+#include <cerrno>
 #include <chrono>
 #include <cstddef>
 #include <exception>
@@ -289,12 +290,15 @@ struct Failure
     ustring files;
     /// libgit2's return code, or 0.
     int code = 0;
+    /// Whether the user has no permission to read or write a file. libgit2 often has the code of a
+    /// lock for this.
+    bool isDenied = false;
 
     /// Whether another operation or program holds a lock: try again.
     bool isLocked() const noexcept
     {
         constexpr int locked = -14; // GIT_ELOCKED
-        return code == locked;
+        return code == locked && !isDenied;
     }
 };
 
@@ -336,7 +340,12 @@ inline Failure describe(const std::exception_ptr &exception)
         failure.kind = kindOf(failure.id);
         failure.text = user.GetUnicodeMessageTxt();
         if (const auto *git = dynamic_cast<const vclink::git::LibGit2Exception *>(&user))
+        {
+            const std::string denied = std::generic_category().message(EACCES);
             failure.code = git->getError().getCode();
+            failure.isDenied = git->getError().getMessage().find(
+                                   fl::i18n::utf8_to_ustring(denied)) != ustring::npos;
+        }
         const auto &arguments = user.GetBaseMsgIDObj().getArguments();
         const bool hasFiles =
             failure.kind == FailureKind::AlreadyAdded || failure.kind == FailureKind::Conflicted;

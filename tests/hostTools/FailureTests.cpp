@@ -13,6 +13,7 @@
 #include "support/GitFixture.hpp"
 #include "support/LocaleOfTheProcess.hpp"
 #include "support/TestInteractor.hpp"
+#include "support/UnprivilegedUser.hpp"
 #include "vclink/git/BranchManager.hpp"
 #include "vclink/git/GitAdapterFactory.hpp"
 
@@ -83,6 +84,21 @@ TEST_F(HostFailures, TellThatAnotherProgramHoldsALock)
     repository_.write("b", "new\n");
     repository_.write(".git/index.lock", "");
     EXPECT_TRUE(fail([this] { adapter_->addFiles({pathOf("b")}); }).isLocked());
+}
+
+TEST_F(HostFailures, TellAMissingPermissionFromALock)
+{
+    repository_.setMode(".git/HEAD", 0);
+    giveToUnprivilegedUser(repository_.path());
+    const std::string answer = runAsUnprivilegedUser(
+        [this]
+        {
+            const auto manager = vclink::git::BranchManager::create(*adapter_);
+            const Failure failure = fail([&manager] { (void)manager->getHeadRevision(); });
+            return std::to_string(failure.code) + (failure.isDenied ? " denied" : "") +
+                   (failure.isLocked() ? " locked" : "");
+        });
+    EXPECT_EQ(answer, "-14 denied");
 }
 
 TEST_F(HostFailures, OfRemovingAndMergingAreToldApart)
