@@ -158,6 +158,11 @@ CMAdapter &Session::adapter()
     return *adapter_;
 }
 
+bool Session::hasAdapter() const noexcept
+{
+    return adapter_ != nullptr;
+}
+
 CMAdapter &Session::workingCopy()
 {
     CMAdapter &found = adapter();

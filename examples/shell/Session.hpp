@@ -41,6 +41,9 @@ class Session
     ///         and what the back end throws
     CMAdapter &adapter();
 
+    /// Whether adapter() has returned one. A clone needs none.
+    bool hasAdapter() const noexcept;
+
     /// As adapter().
     /// @throws ShellFailure also in a bare repository, which has no files
     CMAdapter &workingCopy();

@@ -17,6 +17,12 @@ constexpr Translation failureRows[] = {
     {"Another program was using Git here. Try again.",
      "Ein anderes Programm hat hier mit Git gearbeitet. Versuchen Sie es noch einmal.",
      "別のプログラムがここで Git を使っていました。もう一度試してください。"},
+    {"The file is not locked: you have no permission to read or write it. Check the permissions of "
+     "the file\nand of the folders that contain it.",
+     "Die Datei ist nicht gesperrt: Sie dürfen sie nicht lesen oder schreiben. Prüfen Sie die "
+     "Rechte der Datei\nund der Ordner, in denen sie liegt.",
+     "ファイルはロックされていません。読み取りまたは書き込みの権限がありません。ファイルと、"
+     "それを含む\nフォルダーの権限を確認してください。"},
     {"The repository belongs to %1%. If you trust it, run: git config --global --add "
      "safe.directory %2%",
      "Das Repository gehört %1%. Wenn Sie ihm vertrauen: git config --global --add safe.directory "
@@ -38,6 +44,14 @@ constexpr Translation failureRows[] = {
      "extensions in\n%1% beschreiben es. Wenn git hier arbeiten kann, benutzen Sie git.",
      "libgit2 はこのリポジトリの形式に対応していません。形式は %1% "
      "の\ncore.repositoryformatversion と extensions にあります。git が使える場合は、git "
+     "を使ってください。"},
+    {"libgit2 does not know the format of the remote repository; core.repositoryformatversion and "
+     "extensions in\nits configuration describe it. If git can work with it, use git.",
+     "libgit2 kennt das Format des entfernten Repositorys nicht; core.repositoryformatversion und "
+     "extensions\nin dessen Konfiguration beschreiben es. Wenn git damit arbeiten kann, benutzen "
+     "Sie git.",
+     "libgit2 はリモートのリポジトリの形式に対応していません。形式はその設定の\n"
+     "core.repositoryformatversion と extensions にあります。git が使える場合は、git "
      "を使ってください。"},
     {"%1%.", "%1%.", "%1%。"},
     {"There is a branch '%1%' already. Choose another name, or use the branch that is "

@@ -63,7 +63,10 @@ ExitStatus runWithRemote(Session &session, const std::string &text, RemoteNotes 
         {
             complain(explanation);
         }
-        tellWayOut(session);
+        if (!tellRemoteFormat(session, failure.getError()))
+        {
+            tellWayOut(session);
+        }
         return Failed;
     }
 }

@@ -17,6 +17,7 @@
 #include "fl/i18n/convert.hpp"
 #include "names.hpp"
 #include "texts.hpp"
+#include "vclink/git/BranchManager.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
 #include "workingCopy.hpp"
 
@@ -93,11 +94,38 @@ std::string describeAge(const fs::path &file)
                          : sayCount(count(Days()), "%1% day", "%1% days");
 }
 
+/// libgit2 has the same words, and often the same code, for a lock and for a file that the user has
+/// no right to read or write.
+bool isDenied(const std::string &text)
+{
+    return text.find(std::generic_category().message(EACCES)) != std::string::npos;
+}
+
+std::string explainDenial()
+{
+    return say("The file is not locked: you have no permission to read or write it. Check the "
+               "permissions of the file\nand of the folders that contain it.");
+}
+
+bool canBeOpened(CMAdapter &adapter)
+{
+    try
+    {
+        git::BranchManager::create(adapter)->getRepositoryState();
+        return true;
+    }
+    catch (const git::LibGit2Exception &)
+    {
+        return false;
+    }
+}
+
 /// libgit2 says "unsupported" of other things too, e.g. of an address.
 bool isOfFormat(const ustring &message)
 {
     return message.find(u"unsupported repository ") == 0 ||
-           message.find(u"unsupported extension ") == 0;
+           message.find(u"unsupported extension ") == 0 ||
+           message.find(u"unknown object format ") == 0;
 }
 
 std::string nameOf(::uid_t user)
@@ -117,16 +145,22 @@ void tellWayOut(Session &session)
     catch (const git::LibGit2Exception &failure)
     {
         const int code = failure.getError().getCode();
+        const std::string text = fl::i18n::ustring_to_utf8(failure.getError().getMessage());
+        if (isDenied(text) && text.find(" locked: ") != std::string::npos)
+        {
+            complain(explainDenial());
+            return;
+        }
+        if (!session.hasAdapter())
+        {
+            // A clone has no repository to look at.
+            return;
+        }
         const bool namesSetting =
             failure.getError().getMessage().find(u"safe.directory") != ustring::npos;
-        // libgit2 has the same code for a file that the user has no right to read or write.
-        const bool isDenied =
-            fl::i18n::ustring_to_utf8(failure.getError().getMessage())
-                .find(std::generic_category().message(EACCES)) != std::string::npos;
-        if (code == isLocked && !isDenied)
+        if (code == isLocked)
         {
-            tellLocks(session.adapter(),
-                      fl::i18n::ustring_to_utf8(failure.getError().getMessage()));
+            tellLocks(session.adapter(), text);
         }
         else if (code == isNoFastForward)
         {
@@ -154,6 +188,19 @@ void tellWayOut(Session &session)
     }
 }
 
+bool tellRemoteFormat(Session &session, const git::GitError &failure)
+{
+    const bool isOfRemote = isOfFormat(failure.getMessage()) &&
+                            (!session.hasAdapter() || canBeOpened(session.adapter()));
+    if (isOfRemote)
+    {
+        complain(say("libgit2 does not know the format of the remote repository; "
+                     "core.repositoryformatversion and extensions in\nits configuration describe "
+                     "it. If git can work with it, use git."));
+    }
+    return isOfRemote;
+}
+
 bool namesLock(CMAdapter &adapter, const std::string &text)
 {
     return !findNamedLocks(adapter, text).empty();
@@ -162,6 +209,11 @@ bool namesLock(CMAdapter &adapter, const std::string &text)
 void tellLocks(CMAdapter &adapter, const std::string &reason)
 {
     const std::vector<fs::path> named = findNamedLocks(adapter, reason);
+    if (named.empty() && isDenied(reason))
+    {
+        complain(explainDenial());
+        return;
+    }
     const std::vector<fs::path> locks =
         named.empty() ? findLocks(nativePath(adapter.getRootFolder())) : named;
     for (const fs::path &lock : locks)

@@ -5,6 +5,7 @@
 #include <string>
 
 #include "vclink/CMAdapter.hpp"
+#include "vclink/git/GitError.hpp"
 
 namespace vclink::shell
 {
@@ -15,7 +16,13 @@ class Session;
 /// trust a repository of another user. Call it only in a handler.
 void tellWayOut(Session &session);
 
-/// Names the locks in a repository, and how old they are.
+/// If an operation with a remote failed because libgit2 does not support the format of the remote
+/// repository, not of the working copy's own, says so.
+/// @return whether that is the cause
+bool tellRemoteFormat(Session &session, const git::GitError &failure);
+
+/// Names the locks in a repository, and how old they are. If the user had no permission for a file
+/// instead, which libgit2 reports with the same code, says so.
 /// @param reason the text of the failure; if it names some of the locks, the others are left out
 void tellLocks(CMAdapter &adapter, const std::string &reason);
 

@@ -3,6 +3,7 @@
 
 #include "ShellRemoteFixture.hpp"
 #include "runOnTerminal.hpp"
+#include "support/UnprivilegedUser.hpp"
 #include "support/libgit2Release.hpp"
 #include "transport/listening.hpp"
 
@@ -12,6 +13,7 @@ namespace
 {
 
 namespace fs = std::filesystem;
+using testing::AllOf;
 using testing::ContainsRegex;
 using testing::EndsWith;
 using testing::HasSubstr;
@@ -52,6 +54,35 @@ class ShellClone : public ShellRemoteFixture
                repository.git({"config", "--local", "--get-regexp", "^(remote|branch)\\."});
     }
 };
+
+TEST_F(ShellClone, SaysThatTheRemoteHasAFormatThatLibGit2DoesNotKnow)
+{
+    const GitRepository other = makeRepository("other");
+    const std::string path = other.path().string();
+    other.git({"config", "core.repositoryFormatVersion", "1"});
+    other.git({"config", "extensions.strange", "true"});
+    EXPECT_THAT(fail(path), AllOf(HasSubstr("unsupported extension"),
+                                  EndsWith("\nvclink-shell: libgit2 does not know the format of "
+                                           "the remote repository; core.repositoryformatversion "
+                                           "and extensions in\nits configuration describe it. If "
+                                           "git can work with it, use git.\n")));
+    other.write(".git/config", "[core]\nrepositoryformatversion = 9\n");
+    EXPECT_THAT(fail(path), AllOf(HasSubstr("unsupported repository version"),
+                                  HasSubstr("the format of the remote repository; "),
+                                  Not(HasSubstr("Neither"))));
+}
+
+TEST_F(ShellClone, SaysThatTheRemoteMayNotBeRead)
+{
+    const GitRepository other = makeRepository("other");
+    other.setMode(".git/HEAD", 0);
+    giveToUnprivilegedUser(folder().path());
+    const std::string errors = runAsUnprivilegedUser([&] { return fail(other.path().string()); });
+    EXPECT_THAT(errors, HasSubstr("HEAD' is locked: Permission denied"));
+    EXPECT_THAT(errors, HasSubstr("\nvclink-shell: The file is not locked: you have no permission "
+                                  "to read or write it. "));
+    EXPECT_THAT(errors, Not(HasSubstr("Neither")));
+}
 
 TEST_F(ShellClone, MakesAWorkingCopyAsGitDoes)
 {

@@ -133,6 +133,26 @@ TEST_F(ShellFailures, NameNoOtherProgramWhereAFileMayNotBeRead)
             return runIn(repository.path(), {"commit", "-m", "Work"}).errors;
         });
     EXPECT_THAT(errors, HasSubstr("file' is locked: Permission denied"));
+    EXPECT_THAT(errors, HasSubstr("\nvclink-shell: The file is not locked: you have no permission "
+                                  "to read or write it. "));
+    EXPECT_THAT(errors, Not(HasSubstr("Try again")));
+}
+
+TEST_F(ShellFailures, NameNoOtherProgramWhereAMergeMayNotReadAReference)
+{
+    GitRepository repository = makeRepository();
+    repository.write("file", "text\n");
+    repository.commitAll("begin");
+    repository.git({"branch", "side"});
+    repository.setMode(".git/refs/heads/main", 0200);
+    giveToUnprivilegedUser(repository.path());
+    const std::string errors = runAsUnprivilegedUser(
+        [&] {
+            return runIn(repository.path(), {"merge", "side"}).errors;
+        });
+    EXPECT_THAT(errors, HasSubstr("main' is locked: Permission denied"));
+    EXPECT_THAT(errors, HasSubstr("\nvclink-shell: The file is not locked: you have no permission "
+                                  "to read or write it. "));
     EXPECT_THAT(errors, Not(HasSubstr("Try again")));
 }
 

@@ -41,6 +41,32 @@ TEST_F(ShellFetch, BringsBranchesAndTheirTagsUpToDateAsGitDoes)
     EXPECT_EQ(repository_.git({"fsck", "--no-progress"}), "");
 }
 
+/// So do pushes and listings.
+TEST_F(ShellFetch, SaysThatTheRemoteHasAFormatThatLibGit2DoesNotKnow)
+{
+    const GitRepository other = makeRepository("other");
+    other.write(".git/config", "[core]\nrepositoryformatversion = 9\n");
+    repository_.git({"remote", "add", "other", other.path().string()});
+    const std::string advice = "core.repositoryformatversion and extensions in\n";
+    for (const std::vector<std::string> &arguments :
+         {std::vector<std::string>{"fetch", "other"},
+          {"heads", "other"},
+          {"push", "other", "refs/heads/main:refs/heads/main"}})
+    {
+        const CommandResult result = run(arguments);
+        EXPECT_EQ(result.exitStatus, 1) << arguments.front();
+        EXPECT_THAT(result.errors, HasSubstr("\nvclink-shell: libgit2 does not know the format of "
+                                             "the remote repository; " +
+                                             advice + "its configuration describe it. "))
+            << arguments.front();
+    }
+    // Only git knows this extension.
+    repository_.git({"config", "core.repositoryFormatVersion", "1"});
+    repository_.git({"config", "extensions.noop-v1", "true"});
+    EXPECT_THAT(run({"fetch", "origin"}).errors,
+                HasSubstr("the format of this repository; " + advice + ".git/config describe it."));
+}
+
 TEST_F(ShellFetch, BringsOnlyWhatIsNamed)
 {
     const std::string before = references(repository_).at("refs/remotes/origin/main");

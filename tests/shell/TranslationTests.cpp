@@ -62,7 +62,7 @@ bool isForPrograms(const std::string &text)
         // of the library's refusals
         "is not in this partial clone",
         // of libgit2
-        "unsupported repository ", "unsupported extension ",
+        "unsupported repository ", "unsupported extension ", "unknown object format ",
         // a failure of the system
         "A pipe can't be made", "Standard output is closed."};
     const bool isCommand = text.rfind("git ", 0) == 0 || text.rfind("vclink-shell ", 0) == 0;
