@@ -43,15 +43,21 @@ bool leavesTags(const FetchSettings &settings, std::string_view source)
     return settings.tags == GIT_REMOTE_DOWNLOAD_TAGS_AUTO && isIn(tagsFolder, source);
 }
 
-/// Returns true if libgit2 finds out whether a branch moves forward.
+/// Returns true if libgit2 finds out whether a reference moves forward.
 bool isGuarded(const FetchSettings &settings, std::string_view source)
 {
     return !settings.isShallow && (isIn(branchesFolder, source) || source == "HEAD");
 }
 
-bool canMoveBranch(const Refspec &refspec)
+/// Remote-tracking branches repeat what the remote had.
+bool canHaveWork(const std::string &target)
 {
-    return !refspec.isForced && refspec.canReach(branchesFolder);
+    return !target.empty() && !isIn(trackingFolder, target);
+}
+
+bool canMoveWork(const Refspec &refspec)
+{
+    return !refspec.isForced && canHaveWork(refspec.target.substr(0, refspec.target.find('*')));
 }
 
 bool canMoveTag(const Refspec &refspec)
@@ -69,7 +75,7 @@ class TargetMoves
         {
             forced_.insert(target);
         }
-        else if (isIn(tagsFolder, target) || (isIn(branchesFolder, target) && !isGuarded))
+        else if (isIn(tagsFolder, target) || (canHaveWork(target) && !isGuarded))
         {
             unforced_.push_back({target, id});
         }
@@ -139,14 +145,13 @@ bool mayMoveUnguarded(const FetchSettings &settings)
 {
     const auto mayMove = [&settings](const Refspec &refspec)
     {
-        return (canMoveTag(refspec) && !leavesTags(settings, refspec.source)) ||
-               (canMoveBranch(refspec) && !isGuarded(settings, refspec.source));
+        return !leavesTags(settings, refspec.source) &&
+               (canMoveTag(refspec) ||
+                (canMoveWork(refspec) && !isGuarded(settings, refspec.source)));
     };
-    const auto mayMovePassively = [](const Refspec &refspec)
-    { return canMoveTag(refspec) || canMoveBranch(refspec); };
     return settings.tags == GIT_REMOTE_DOWNLOAD_TAGS_ALL ||
            std::any_of(settings.active.begin(), settings.active.end(), mayMove) ||
-           std::any_of(settings.passive.begin(), settings.passive.end(), mayMovePassively);
+           std::any_of(settings.passive.begin(), settings.passive.end(), canMoveWork);
 }
 
 std::vector<Move> findUnguardedMoves(const FetchSettings &settings, const AdvertisedIds &ids)

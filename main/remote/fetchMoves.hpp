@@ -28,7 +28,7 @@ struct FetchSettings
 FetchSettings readFetchSettings(git_repository *repository, const git_remote *remote,
                                 const git_strarray &given, const git_fetch_options &options);
 
-/// A branch or tag that the fetch writes.
+/// A reference that the fetch writes.
 struct Move
 {
     std::string target;
@@ -38,8 +38,9 @@ struct Move
 /// Returns true if findUnguardedMoves() can find something, whatever the remote has.
 bool mayMoveUnguarded(const FetchSettings &settings);
 
-/// Finds the tags that the fetch writes without a '+', and the branches that it writes without a
-/// '+' and for which libgit2 does not find out whether they move forward:
+/// Finds the tags that the fetch writes without a '+', and the other references outside
+/// refs/remotes/ that it writes without a '+' and for which libgit2 does not find out whether they
+/// move forward:
 ///
 /// - in a shallow repository, where it takes missing parents for a yes
 /// - if the source is not a branch, because it takes any failure for a yes

@@ -3,11 +3,13 @@
 
 #include <algorithm>
 #include <iterator>
+#include <optional>
 #include <string>
 #include <vector>
 
 #include <git2/deprecated.h> // LIBGIT2_VER_MAJOR, of which 1.8 has made another name
 #include <git2/errors.h>
+#include <git2/object.h>
 #include <git2/version.h>
 
 #include "error/errorUtil/GitResult.hpp"
@@ -96,10 +98,10 @@ void refusePruning(std::vector<Refspec> prunable, const AdvertisedIds &ids)
 }
 
 /// Refuses tags that would be replaced.
-/// @return the branches that would be moved
+/// @return the other references that would be moved
 std::vector<Move> refuseTags(git_repository *repository, const std::vector<Move> &moves)
 {
-    std::vector<Move> branches;
+    std::vector<Move> others;
     for (const Move &move : moves)
     {
         const auto here = findId(repository, move.target);
@@ -111,18 +113,44 @@ std::vector<Move> refuseTags(git_repository *repository, const std::vector<Move>
         {
             raiseOtherTag(move.target);
         }
-        branches.push_back(move);
+        others.push_back(move);
     }
-    return branches;
+    return others;
 }
 
-/// @param branches whose new commits are here
-void refuseLostCommits(git_repository *repository, const std::vector<Move> &branches)
+/// Returns the commit of an object, for example of an annotated tag.
+std::optional<git_oid> findCommit(git_repository *repository, const git_oid &id)
 {
-    for (const Move &move : branches)
+    const OwnedHandle<git_object> object =
+        acquire<git_object>(git_object_lookup, repository, &id, GIT_OBJECT_ANY).value();
+    const auto commit = acquire<git_object>(git_object_peel, object.get(), GIT_OBJECT_COMMIT);
+    const int code = commit.has_error() ? commit.error().getCode() : 0;
+    if (code == GIT_EINVALIDSPEC || code == GIT_EPEEL)
+    {
+        return std::nullopt;
+    }
+    return *git_object_id(commit.value().get());
+}
+
+/// Only a branch is always at a commit. As git, compares nothing else.
+bool losesCommits(git_repository *repository, const Move &move, const git_oid &here)
+{
+    if (isIn(branchesFolder, move.target))
+    {
+        return !descendsFrom(repository, move.id, here);
+    }
+    const auto before = findCommit(repository, here);
+    const auto after = findCommit(repository, move.id);
+    return before && after && !descendsFrom(repository, *after, *before);
+}
+
+/// @param moves of references that are no tags, whose new commits are here
+void refuseLostCommits(git_repository *repository, const std::vector<Move> &moves)
+{
+    for (const Move &move : moves)
     {
         const auto here = findId(repository, move.target);
-        if (here && !descendsFrom(repository, move.id, *here))
+        if (here && losesCommits(repository, move, *here))
         {
             raiseGitError(GIT_ENONFASTFORWARD, GIT_ERROR_REFERENCE,
                           "'" + move.target +
@@ -157,11 +185,11 @@ void refuseFetchThatLoses(git_repository *repository, git_remote *remote,
     {
         return;
     }
-    const std::vector<Move> branches = refuseTags(repository, findUnguardedMoves(settings, ids));
-    if (!branches.empty())
+    const std::vector<Move> others = refuseTags(repository, findUnguardedMoves(settings, ids));
+    if (!others.empty())
     {
         check(git_remote_download, remote, getArrayPointer(refspecs), &options);
-        refuseLostCommits(repository, branches);
+        refuseLostCommits(repository, others);
     }
 }
 

@@ -156,6 +156,34 @@ TEST_P(Fetch, MovesABranchBesideOnlyForward)
     expectSound(fetched_);
 }
 
+TEST_P(Fetch, MovesNotesBesideOnlyForward)
+{
+    constexpr const char *notes = "refs/notes/commits";
+    const auto append = [](const GitRepository &repository, const std::string &words)
+    {
+        repository.git(
+            {"-c", "user.name=A", "-c", "user.email=a@b", "notes", "append", "-m", words, "HEAD"});
+    };
+    append(source_, "first");
+    publish({notes});
+    fetched_.git({"config", "--add", "remote.origin.fetch", "refs/notes/*:refs/notes/*"});
+    fetch(fetched_, {notes});
+    const std::string first = fetchedId(notes);
+    append(source_, "second");
+    publish({notes});
+    fetch(fetched_, {notes});
+    const std::string second = fetchedId(notes);
+    EXPECT_EQ(second, source_.line({"rev-parse", notes}));
+    fetched_.git({"update-ref", notes, first});
+    append(fetched_, "own");
+    const std::string own = fetchedId(notes);
+    EXPECT_EQ(failureOf([&] { fetch(fetched_, {notes}); }).code, GIT_ENONFASTFORWARD);
+    // A server need not allow ids.
+    EXPECT_NE(failureOf([&] { fetch(fetched_, {second + ':' + notes}); }).code, GIT_OK);
+    EXPECT_EQ(fetchedId(notes), own);
+    expectSound(fetched_);
+}
+
 TEST_P(Fetch, KeepsAShallowRepositorySound)
 {
     constexpr std::string_view into = "refs/heads/main:refs/heads/";

@@ -56,12 +56,13 @@ class VCLINK_GIT_EXPORT GitRemote
     /// only if a refspec names it. Does not fail if a refspec without '+' would move a reference to
     /// a commit that is not a descendant; the reference stays.
     ///
-    /// Throws before any reference moves if libgit2 would lose a branch or tag: if pruning would
-    /// delete the target of a refspec without '*' whose source the remote lacks (GIT_ENOTFOUND), if
-    /// a tag would be replaced without a '+' (GIT_EEXISTS), or if a branch would lose commits
-    /// without a '+', in a shallow repository for example (GIT_ENONFASTFORWARD). Throws before
-    /// anything is downloaded if libgit2 would remove .git/shallow, as 1.7 and later do if the
-    /// remote is on this machine (GIT_ERROR).
+    /// Throws before any reference moves if libgit2 would lose a reference or its commits: if
+    /// pruning would delete the target of a refspec without '*' whose source the remote lacks
+    /// (GIT_ENOTFOUND), if a tag would be replaced without a '+' (GIT_EEXISTS), or if a branch, or
+    /// another reference such as one to notes, would lose commits without a '+', for example in a
+    /// shallow repository (GIT_ENONFASTFORWARD). Does not protect remote-tracking branches. Throws
+    /// before anything is downloaded if libgit2 would remove .git/shallow, as 1.7 and later do if
+    /// the remote is on this machine (GIT_ERROR).
     ///
     /// **Moves a branch even if a working tree has it checked out**, unlike git. The files and the
     /// index stay, so the next commit undoes what the branch got; with '+' local commits may be in

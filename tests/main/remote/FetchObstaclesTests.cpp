@@ -72,6 +72,12 @@ class FetchObstacles : public RemoteFixture
         EXPECT_EQ(references(repository_), references(copy));
     }
 
+    static void writeNote(const GitRepository &repository, const std::string &words)
+    {
+        repository.git(
+            {"-c", "user.name=A", "-c", "user.email=a@b", "notes", "append", "-m", words, "HEAD"});
+    }
+
     /// A tag of the author's at the server, and another one here; both annotated, or none.
     void tagBoth(const std::string &name, bool isAnnotated)
     {
@@ -217,6 +223,73 @@ TEST_F(FetchObstacles, KeepCommitsFromConfiguredRefspecsAndIds)
     expectAsGitDoes({id + ":refs/heads/copy"});
     expectAsGitDoes({'+' + id + ":refs/heads/own"});
     EXPECT_EQ(idOf("own"), id);
+}
+
+TEST_F(FetchObstacles, KeepNotes)
+{
+    start();
+    const std::string notes = "refs/notes/commits";
+    const std::string spec = notes + ':' + notes;
+    writeNote(author_, "first");
+    author_.git({"push", "--quiet", "server", notes});
+    repository_.git({"fetch", "--quiet", "origin", "main", spec});
+    writeNote(repository_, "own");
+    writeNote(author_, "second");
+    author_.git({"push", "--quiet", "server", notes});
+    const std::string id = idOf(notes, author_);
+    for (const std::string &refspec :
+         {spec, std::string("refs/notes/*:refs/notes/*"), std::string("refs/n*:refs/n*"),
+          id + ':' + notes, "refs/heads/main:refs/heads/new " + id + ':' + notes})
+        expectRefusedAsByGit(split(refspec, ' '), GIT_ENONFASTFORWARD, notes);
+    repository_.git({"config", "--add", "remote.origin.fetch", "refs/notes/*:refs/notes/*"});
+    expectRefusedAsByGit({}, GIT_ENONFASTFORWARD, notes);
+    expectRefusedAsByGit({notes}, GIT_ENONFASTFORWARD, notes);
+    expectAsGitDoes({"main"});
+    expectAsGitDoes({id});
+    repository_.git({"update-ref", notes, notes + '~'});
+    expectAsGitDoes({notes});
+    EXPECT_EQ(idOf(notes), id);
+    writeNote(repository_, "own");
+    expectAsGitDoes({'+' + id + ':' + notes});
+    EXPECT_EQ(idOf(notes), id);
+}
+
+/// git compares the commits of tags, and lets other objects move.
+TEST_F(FetchObstacles, KeepOtherReferencesAsGitDoes)
+{
+    start();
+    tagBoth("v1", true);
+    repository_.git({"config", "remote.origin.tagOpt", "--no-tags"});
+    repository_.git({"update-ref", "refs/own/tag", "v1"});
+    repository_.git({"update-ref", "refs/own/commit", "own"});
+    repository_.git({"update-ref", "refs/own/tree", "own^{tree}"});
+    // libgit2 does not release what it has of a history if the other object is no commit.
+    const WithoutLeakChecks without;
+    expectAsGitDoes({"refs/tags/v1:refs/own/tag"});
+    EXPECT_EQ(idOf("refs/own/tag"), idOf("v1", author_));
+    expectAsGitDoes({"refs/tags/v1:refs/own/tree"});
+    EXPECT_EQ(idOf("refs/own/tree"), idOf("v1", author_));
+    expectRefusedAsByGit({"refs/tags/v1:refs/own/commit"}, GIT_ENONFASTFORWARD, "refs/own/commit");
+    author_.git({"push", "--quiet", "server", "HEAD^{tree}:refs/own/tree"});
+    expectAsGitDoes({"refs/own/tree:refs/own/commit"});
+    EXPECT_EQ(idOf("refs/own/commit"), idOf("HEAD^{tree}", author_));
+}
+
+/// They repeat what the remote has.
+TEST_F(FetchObstacles, LeaveRemoteTrackingBranchesToLibGit2)
+{
+    start();
+    const std::string tracking = "refs/remotes/origin/main";
+    repository_.git({"update-ref", tracking, "own"});
+    repository_.git({"config", "remote.origin.fetch", "refs/heads/*:refs/remotes/origin/*"});
+    const std::string own = idOf("own");
+    fetch();
+    EXPECT_EQ(idOf(tracking), own);
+    fetch({"refs/heads/main"});
+    EXPECT_EQ(idOf(tracking), idOf("main", author_));
+    repository_.git({"update-ref", tracking, "own"});
+    fetch({idOf("main", author_) + ':' + tracking});
+    EXPECT_EQ(idOf(tracking), idOf("main", author_));
 }
 
 /// libgit2 would give a branch the id of the tag.
