@@ -160,6 +160,45 @@ void refuseOtherReference(const git_reference *branch, const git_object *target,
     }
 }
 
+/// Another process may move the branch while its files are written, which takes time. HEAD must not
+/// name it then: the next commit would undo what the branch got.
+class SwitchTarget
+{
+  public:
+    SwitchTarget(git_repository *repository, const git_reference *branch)
+        : repository_(repository), name_(git_reference_name(branch)), id_(currentId())
+    {
+    }
+
+    const char *name() const noexcept
+    {
+        return name_;
+    }
+
+    /// @param state what the switch leaves
+    void refuseMoved(const std::string &state) const
+    {
+        if (!isSameId(currentId(), id_))
+        {
+            raiseGitError(GIT_EMODIFIED, GIT_ERROR_REFERENCE,
+                          "another process has moved '" + std::string(name_) + "' meanwhile; " +
+                              state);
+        }
+    }
+
+  private:
+    git_oid currentId() const
+    {
+        git_oid id{};
+        check(git_reference_name_to_id, &id, repository_, name_);
+        return id;
+    }
+
+    git_repository *repository_;
+    const char *name_;
+    git_oid id_;
+};
+
 } // namespace
 
 BasicBranchManager::BasicBranchManager(GitAdapter &adapter)
@@ -211,6 +250,7 @@ void BasicBranchManager::switchBranch(const BranchName &name)
     const OwnedHandle<git_repository> repository = adapter_.getRepository();
     IndexLock lock(repository.get());
     const OwnedHandle<git_reference> branch = lookupLocalBranch(repository.get(), shortName);
+    const SwitchTarget switchTarget(repository.get(), branch.get());
     const OwnedHandle<git_object> target = revparseObject(repository.get(), name).value();
     refuseOtherReference(branch.get(), target.get(), name);
     refuseSwitchThroughLink(repository.get());
@@ -223,13 +263,19 @@ void BasicBranchManager::switchBranch(const BranchName &name)
     watch.lookBeforeSwitch(target.get());
     refuseUnwritableReflog(repository.get(), "HEAD");
     awaitUnlocked(repository.get(), "HEAD");
+    switchTarget.refuseMoved("nothing has been changed, try again");
     check(git_checkout_tree, repository.get(), target.get(), &record);
     watch.settle();
     lock.publish();
     // After the checkout, so that HEAD stays if the checkout fails.
-    const char *const head = git_reference_name(branch.get());
-    check(retryWhileLocked(repository.get(),
-                           [&] { return call(git_repository_set_head, repository.get(), head); }));
+    check(retryWhileLocked(
+        repository.get(),
+        [&]
+        {
+            switchTarget.refuseMoved("its files have been written, but HEAD has not moved: see "
+                                     "'git status'");
+            return call(git_repository_set_head, repository.get(), switchTarget.name());
+        }));
 }
 
 void BasicBranchManager::createBranch(const BranchParameters &parameters)

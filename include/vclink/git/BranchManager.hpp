@@ -74,14 +74,16 @@ class VCLINK_GIT_EXPORT BranchManager
     ///
     /// Also refuses while a merge, revert, cherry-pick, rebase or `git am` is under way, and, with
     /// other codes, if another working tree of the repository has the branch checked out
-    /// (GIT_ERROR), if HEAD is a symbolic link or cannot be written (GIT_ERROR), or if it moves
-    /// during the switch (GIT_EMODIFIED).
+    /// (GIT_ERROR), if HEAD is a symbolic link or cannot be written (GIT_ERROR), or if HEAD or the
+    /// branch moves during the switch (GIT_EMODIFIED).
     /// Throws with GIT_EAMBIGUOUS if a tag has the name of the branch and another commit, and for
     /// the branch "stash" if there is a stash.
     ///
     /// After a failure or a cancellation HEAD is unchanged. The files are too, unless one of them,
-    /// the index, or HEAD itself, could not be written. git_branch_lookup, git_revparse_single,
-    /// git_checkout_tree, git_repository_set_head.
+    /// the index, or HEAD itself, could not be written, or another process moved or deleted the
+    /// branch while they were written: then files and index are those of the branch as it was
+    /// before, and the next commit would record them on the old branch. git_branch_lookup,
+    /// git_revparse_single, git_checkout_tree, git_repository_set_head.
     /// @param name the short name
     /// @throws LibGit2Exception with code GIT_ECONFLICT and class GIT_ERROR_CHECKOUT if it refuses
     /// because of files or an operation under way

@@ -148,12 +148,14 @@ TEST_F(CallsOnBranches, OfASwitchAreTheseInOrderWithTheRecordOfASafeCheckout)
     EXPECT_EQ(
         calls.steps(),
         joined({{"git_repository_open_ext", "git_index_open", "git_repository_set_index",
-                 "git_index_set_caps", "git_index_free", "git_branch_lookup", "git_revparse_single",
-                 "git_reference_peel", "git_object_peel", "git_object_free", "git_object_free",
+                 "git_index_set_caps", "git_index_free", "git_branch_lookup",
+                 "git_reference_name_to_id", "git_revparse_single", "git_reference_peel",
+                 "git_object_peel", "git_object_free", "git_object_free",
                  "git_branch_is_checked_out", "git_repository_state", "git_checkout_options_init"},
                 lookBeforeASwitch_,
                 {"git_transaction_new", "git_transaction_lock_ref", "git_transaction_free",
-                 "git_checkout_tree", "git_repository_set_head"},
+                 "git_reference_name_to_id", "git_checkout_tree", "git_reference_name_to_id",
+                 "git_repository_set_head"},
                 endOfTheLook_,
                 {"git_object_free", "git_reference_free", "git_repository_free"}}));
     ASSERT_THAT(checkouts_, SizeIs(1));
