@@ -3,6 +3,9 @@
 
 #include <algorithm>
 #include <array>
+#include <iterator>
+#include <set>
+#include <string>
 #include <string_view>
 #include <utility>
 
@@ -44,16 +47,17 @@ void addOverlooked(git_branch_t type, git_repository *repository,
                    std::vector<BranchPointer> &branches)
 {
     const std::string folder = type == GIT_BRANCH_LOCAL ? "refs/heads" : "refs/remotes";
-    for (const std::string &name : findFilesBesideBrokenLink(repository, folder))
+    std::set<std::string> listed;
+    std::transform(branches.begin(), branches.end(), std::inserter(listed, listed.end()),
+                   [](const BranchPointer &branch) { return branch.getName(); });
+    for (const std::string &name : findReferenceFiles(repository, folder))
     {
-        const BranchPointer branch(name);
-        const bool isListed = std::find(branches.begin(), branches.end(), branch) != branches.end();
         const char *const shortName = name.c_str() + folder.size() + 1;
         // As libgit2, leaves out what is no branch.
-        if (!isListed &&
+        if (listed.count(name) == 0 &&
             acquire<git_reference>(git_branch_lookup, repository, shortName, type).has_value())
         {
-            branches.push_back(branch);
+            branches.emplace_back(name);
         }
     }
 }
@@ -82,8 +86,12 @@ std::vector<BranchPointer> iterateBranches(git_branch_t type, git_repository *re
 
 std::vector<BranchPointer> listBranches(git_branch_t type, git_repository *repository)
 {
+    const bool isCutShort = hasBrokenReferenceLink(repository);
     std::vector<BranchPointer> branches = iterateBranches(type, repository);
-    addOverlooked(type, repository, branches);
+    if (isCutShort)
+    {
+        addOverlooked(type, repository, branches);
+    }
     return branches;
 }
 

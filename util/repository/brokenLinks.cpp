@@ -4,10 +4,16 @@
 #include <algorithm>
 #include <functional>
 #include <memory>
+#include <set>
+#include <utility>
 
 #include <dirent.h>
+#include <git2/errors.h>
 #include <git2/repository.h>
 #include <sys/stat.h>
+#include <sys/types.h>
+
+#include "error/errorUtil/raiseGitError.hpp"
 
 namespace vclink::git
 {
@@ -44,22 +50,72 @@ bool visitEntries(const std::string &folder, const Visitor &visitor)
     return true;
 }
 
-/// Follows links as libgit2 does. A circle of them ends in a link with too many levels.
-bool hasBrokenLink(const std::string &folder)
+/// Follows links as libgit2 does, but never into a folder that it is in.
+class LinkSearch
 {
-    return !visitEntries(folder,
-                         [](const std::string &path, unsigned char type)
-                         {
-                             struct stat status = {};
-                             const bool isLink = type == DT_LNK;
-                             if (isLink && ::stat(path.c_str(), &status) != 0)
-                             {
-                                 return false;
-                             }
-                             const bool isFolder = type == DT_DIR || S_ISDIR(status.st_mode);
-                             return !isFolder || !hasBrokenLink(path);
-                         });
-}
+  public:
+    /// @param type as in dirent
+    /// @return false if the search has ended
+    bool look(const std::string &path, unsigned char type)
+    {
+        struct stat status = {};
+        const bool isLink = type == DT_LNK;
+        if ((isLink || type == DT_DIR) && ::stat(path.c_str(), &status) != 0)
+        {
+            hasBroken_ = hasBroken_ || isLink;
+            return true;
+        }
+        return !S_ISDIR(status.st_mode) || enter(path, {status.st_dev, status.st_ino});
+    }
+
+    /// A circle of links ends in a link with too many levels.
+    bool hasBroken() const noexcept
+    {
+        return hasBroken_ || !circled_.empty();
+    }
+
+    /// Returns a link that ends a circle, which shares a folder with another circle: each turn has
+    /// both to choose from. Empty if there is none.
+    const std::string &crossing() const noexcept
+    {
+        return crossing_;
+    }
+
+  private:
+    using FolderId = std::pair<dev_t, ino_t>;
+
+    bool enter(const std::string &folder, const FolderId &id)
+    {
+        const auto first = std::find(way_.begin(), way_.end(), id);
+        if (first != way_.end())
+        {
+            return noteCircle(first, folder);
+        }
+        way_.push_back(id);
+        const bool goesOn = visitEntries(folder, [this](const std::string &path, unsigned char type)
+                                         { return look(path, type); });
+        way_.pop_back();
+        return goesOn;
+    }
+
+    bool noteCircle(std::vector<FolderId>::const_iterator first, const std::string &link)
+    {
+        const bool isAlone = std::all_of(
+            first, way_.cend(), [this](const FolderId &id) { return circled_.insert(id).second; });
+        if (!isAlone)
+        {
+            crossing_ = link;
+        }
+        return isAlone;
+    }
+
+    /// The folders that the search is in.
+    std::vector<FolderId> way_;
+    /// The folders that are in a circle.
+    std::set<FolderId> circled_;
+    bool hasBroken_ = false;
+    std::string crossing_;
+};
 
 void collectFiles(const std::string &folder, std::vector<std::string> &files)
 {
@@ -80,15 +136,27 @@ void collectFiles(const std::string &folder, std::vector<std::string> &files)
 
 } // namespace
 
-std::vector<std::string> findFilesBesideBrokenLink(git_repository *repository,
-                                                   const std::string &folder)
+bool hasBrokenReferenceLink(git_repository *repository)
+{
+    const std::string shared = git_repository_commondir(repository);
+    LinkSearch search;
+    search.look(shared + "refs", DT_DIR);
+    const std::string &link = search.crossing();
+    if (!link.empty())
+    {
+        raiseGitError(GIT_ERROR, GIT_ERROR_REFERENCE,
+                      "'" + link.substr(shared.size()) +
+                          "' and another symbolic link lead to folders that contain them, so that "
+                          "the list of references has no end: remove them");
+    }
+    return search.hasBroken();
+}
+
+std::vector<std::string> findReferenceFiles(git_repository *repository, const std::string &folder)
 {
     const std::string shared = git_repository_commondir(repository);
     std::vector<std::string> files;
-    if (hasBrokenLink(shared + "refs"))
-    {
-        collectFiles(shared + folder, files);
-    }
+    collectFiles(shared + folder, files);
     for (std::string &file : files)
     {
         file.erase(0, shared.size());

@@ -49,7 +49,8 @@ class VCLINK_GIT_EXPORT BranchManager
 
     /// Returns the full names of the local branches, beginning with "refs/heads/", in libgit2's
     /// order. Those that libgit2 leaves out because of a broken link below `refs/` come last.
-    /// git_branch_next.
+    /// Throws if symbolic links there lead back to folders that contain them in two ways: the list
+    /// would have no end. git_branch_next.
     virtual std::vector<BranchPointer> getLocalBranches() const = 0;
     /// Returns the full names of the remote-tracking branches, beginning with "refs/remotes/", in
     /// libgit2's order, as getLocalBranches. git_branch_next.

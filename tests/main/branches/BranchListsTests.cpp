@@ -1,15 +1,19 @@
 // SPDX-License-Identifier: MIT
 #include <algorithm>
+#include <chrono>
 #include <filesystem>
 #include <string>
 #include <type_traits>
+#include <utility>
 #include <vector>
 
 #include <git2.h>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
+#include <sys/resource.h>
 
 #include "BranchFixture.hpp"
+#include "support/ChildProcess.hpp"
 
 namespace
 {
@@ -109,6 +113,46 @@ TEST_F(BranchLists, AreWholeBesideABrokenLinkAsGitsAre)
             EXPECT_THAT(remote(), testing::Contains("refs/remotes/upstream/new"));
             std::filesystem::remove(place);
         }
+}
+
+/// git and libgit2's iterator would never end.
+TEST_F(BranchLists, FailBesideTwoCirclesThatShareAFolder)
+{
+    repository_.commitAll("first");
+    const auto heads = repository_ / ".git/refs/heads";
+    const std::string longName(100, 'x');
+    std::filesystem::create_directory(heads / longName);
+    using Links = std::vector<std::pair<std::string, std::string>>;
+    for (const Links &links : {Links{{"a", "."}, {"b", "."}},
+                               {{longName + "/a", ".."}, {longName + "/b", ".."}},
+                               {{"a", "../.."}, {"../tags/b", "../heads"}},
+                               {{longName + "/a", ".."}, {"b", longName}}})
+    {
+        SCOPED_TRACE(links[0].second);
+        const auto failure = [this]
+        {
+            // So that the search runs out of them before the links have too many levels.
+            const rlimit limit{32, 32};
+            ::setrlimit(RLIMIT_NOFILE, &limit);
+            const Failure local = failureOf([this] { branches().getLocalBranches(); });
+            const Failure remote = failureOf([this] { branches().getRemoteBranches(); });
+            const bool isRefused = local.code == GIT_ERROR && local == remote &&
+                                   local.text.find("symbolic link") != std::string::npos;
+            return isRefused ? "" : "not refused: " + local.text;
+        };
+        for (const auto &[link, target] : links)
+            std::filesystem::create_symlink(target, heads / link);
+        EXPECT_EQ(runInChild(failure, std::chrono::milliseconds(5'000)), "");
+        std::filesystem::remove(heads / links[1].first);
+        EXPECT_THAT(local(), testing::Contains("refs/heads/main"));
+        std::filesystem::remove(heads / links[0].first);
+    }
+    for (const std::string link : {"a", "../remotes/b", "../tags/c"})
+    {
+        std::filesystem::create_directories((heads / link).parent_path());
+        std::filesystem::create_symlink(".", heads / link);
+        EXPECT_THAT(local(), testing::Contains("refs/heads/main"));
+    }
 }
 
 /// Which is not that of their names.
