@@ -47,6 +47,21 @@ bool isSame(const git_tree_entry *left, const git_tree_entry *right)
            git_tree_entry_filemode(left) == git_tree_entry_filemode(right);
 }
 
+/// Passes over what both sides have, which is most of what there is.
+void passSame(Level &level)
+{
+    for (;; ++level.before.next, ++level.after.next)
+    {
+        const git_tree_entry *const before = level.before.current();
+        const git_tree_entry *const after = level.after.current();
+        if (!isSame(before, after) ||
+            std::strcmp(git_tree_entry_name(before), git_tree_entry_name(after)) != 0)
+        {
+            return;
+        }
+    }
+}
+
 /// Returns the byte at this position of a name. In the order of a tree, the name of a folder ends
 /// with a slash.
 unsigned char byteOf(const git_tree_entry *entry, const char *name, std::size_t place)
@@ -60,10 +75,6 @@ int compare(const git_tree_entry *left, const git_tree_entry *right)
 {
     const char *const leftName = git_tree_entry_name(left);
     const char *const rightName = git_tree_entry_name(right);
-    if (std::strcmp(leftName, rightName) == 0)
-    {
-        return int{isTree(left)} - int{isTree(right)};
-    }
     std::size_t place = 0;
     while (leftName[place] != 0 && leftName[place] == rightName[place])
     {
@@ -138,13 +149,14 @@ void visitTreeChanges(git_repository *repository, const git_tree *before, const 
     levels.back().after.tree = after;
     while (!levels.empty())
     {
+        passSame(levels.back());
         const auto [left, right] = takeNext(levels.back());
         const git_tree_entry *const either = left != nullptr ? left : right;
         if (either == nullptr)
         {
             levels.pop_back();
         }
-        else if (!isSame(left, right))
+        else
         {
             path.resize(levels.back().pathSize);
             path += git_tree_entry_name(either);
