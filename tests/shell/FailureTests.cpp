@@ -19,6 +19,19 @@ using testing::StartsWith;
 
 class ShellFailures : public ShellFixture
 {
+  protected:
+    /// Runs a command as a user who may not read a file, which libgit2 reports as locked.
+    void expectDenied(const GitRepository &repository, const std::vector<std::string> &command,
+                      const std::string &name) const
+    {
+        giveToUnprivilegedUser(repository.path());
+        const std::string errors =
+            runAsUnprivilegedUser([&] { return runIn(repository.path(), command).errors; });
+        EXPECT_THAT(errors, HasSubstr(name + "' is locked: Permission denied"));
+        EXPECT_THAT(errors, HasSubstr("\nvclink-shell: The file is not locked: you have no "
+                                      "permission to read or write it. "));
+        EXPECT_THAT(errors, Not(HasSubstr("Try again")));
+    }
 };
 
 const std::string english = "vclink-shell: Git could not complete the operation: ";
@@ -127,15 +140,7 @@ TEST_F(ShellFailures, NameNoOtherProgramWhereAFileMayNotBeRead)
     repository.git({"config", "user.name", "Person"});
     repository.git({"config", "user.email", "person@example.org"});
     repository.setMode("file", 0200);
-    giveToUnprivilegedUser(repository.path());
-    const std::string errors = runAsUnprivilegedUser(
-        [&] {
-            return runIn(repository.path(), {"commit", "-m", "Work"}).errors;
-        });
-    EXPECT_THAT(errors, HasSubstr("file' is locked: Permission denied"));
-    EXPECT_THAT(errors, HasSubstr("\nvclink-shell: The file is not locked: you have no permission "
-                                  "to read or write it. "));
-    EXPECT_THAT(errors, Not(HasSubstr("Try again")));
+    expectDenied(repository, {"commit", "-m", "Work"}, "file");
 }
 
 TEST_F(ShellFailures, NameNoOtherProgramWhereAMergeMayNotReadAReference)
@@ -145,15 +150,7 @@ TEST_F(ShellFailures, NameNoOtherProgramWhereAMergeMayNotReadAReference)
     repository.commitAll("begin");
     repository.git({"branch", "side"});
     repository.setMode(".git/refs/heads/main", 0200);
-    giveToUnprivilegedUser(repository.path());
-    const std::string errors = runAsUnprivilegedUser(
-        [&] {
-            return runIn(repository.path(), {"merge", "side"}).errors;
-        });
-    EXPECT_THAT(errors, HasSubstr("main' is locked: Permission denied"));
-    EXPECT_THAT(errors, HasSubstr("\nvclink-shell: The file is not locked: you have no permission "
-                                  "to read or write it. "));
-    EXPECT_THAT(errors, Not(HasSubstr("Try again")));
+    expectDenied(repository, {"merge", "side"}, "main");
 }
 
 TEST_F(ShellFailures, NameTheLockThatWasLeftAndItsAge)

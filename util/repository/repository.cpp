@@ -59,6 +59,12 @@ bool isThere(const std::string &path)
     return isThere(path, status);
 }
 
+bool isFilled(const std::string &path)
+{
+    struct stat status = {};
+    return isThere(path, status) && status.st_size != 0;
+}
+
 /// Makes the folder the working tree. A linked working tree that was copied or moved still names
 /// its old place, and core.worktree can name any folder: files there are not the host's.
 void useWorkingTree(git_repository *repository, const std::string &folder)
@@ -150,9 +156,7 @@ bool hasMergeHead(git_repository *repository)
 
 bool isInSeries(git_repository *repository)
 {
-    struct stat status = {};
-    return isThere(git_repository_path(repository) + std::string("sequencer/todo"), status) &&
-           status.st_size != 0;
+    return isFilled(git_repository_path(repository) + std::string("sequencer/todo"));
 }
 
 void cleanUpRepositoryState(git_repository *repository)
@@ -176,7 +180,8 @@ void cleanUpRepositoryState(git_repository *repository)
 
 bool isShallow(git_repository *repository)
 {
-    return isThere(git_repository_commondir(repository) + std::string("shallow"));
+    // libgit2 1.9 makes an empty one in each fetch, and leaves it behind if the fetch then fails.
+    return isFilled(git_repository_commondir(repository) + std::string("shallow"));
 }
 
 OwnedHandle<git_index> getRepositoryIndex(git_repository *repository)

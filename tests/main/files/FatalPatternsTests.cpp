@@ -72,6 +72,22 @@ class FatalPatterns : public CommitFixture
         EXPECT_EQ(failure.errorClass, GIT_ERROR_REPOSITORY);
         EXPECT_THAT(failure.text, HasSubstr("line 2 of '" + repository_.path().string()));
     }
+
+    /// @param untracked a file that an addition would look for patterns of
+    void expectEachOperationRefused(const std::string &untracked)
+    {
+        const auto adapter = makeAdapter(repository_.path());
+        const auto branches = vclink::git::BranchManager::create(*adapter);
+        expectRefused([&] { adapter->getFolderStates(asPath(repository_.path())); });
+        expectRefused([&] { add({untracked}); });
+        expectRefused([this] { remove({"file"}); });
+        expectRefused([this] { markResolved("file"); });
+        expectRefused([this] { revert({"file"}); });
+        expectRefused([this] { commit(); });
+        expectRefused([&] { branches->switchBranch("topic"); });
+        EXPECT_THROW(branches->merge("topic"), vclink::git::GitException);
+        EXPECT_EQ(repository_.read("file"), "edited\n");
+    }
 };
 
 TEST_F(FatalPatterns, AreThoseAtWhichLibGit2EndsTheProcess)
@@ -119,17 +135,7 @@ TEST_F(FatalPatterns, StopEachOperationThatReadsThem)
         {
             repository_.write(name, "*.o\n" + line + "\n");
             SCOPED_TRACE(name);
-            const auto adapter = makeAdapter(repository_.path());
-            const auto branches = vclink::git::BranchManager::create(*adapter);
-            expectRefused([&] { adapter->getFolderStates(asPath(repository_.path())); });
-            expectRefused([this] { add({"new"}); });
-            expectRefused([this] { remove({"file"}); });
-            expectRefused([this] { markResolved("file"); });
-            expectRefused([this] { revert({"file"}); });
-            expectRefused([this] { commit(); });
-            expectRefused([&] { branches->switchBranch("topic"); });
-            EXPECT_THROW(branches->merge("topic"), vclink::git::GitException);
-            EXPECT_EQ(repository_.read("file"), "edited\n");
+            expectEachOperationRefused("new");
             repository_.write(name, "*.o\n");
         }
     }
@@ -157,16 +163,7 @@ TEST_F(FatalPatterns, InATrackedFileOfAFolderStopEachOperationThatReadsThem)
     repository_.write("file", "edited\n");
     repository_.write("folder/new", "x");
     ASSERT_THAT(queryInChild(), HasSubstr("would keep the operation from ending"));
-    const auto adapter = makeAdapter(repository_.path());
-    const auto branches = vclink::git::BranchManager::create(*adapter);
-    expectRefused([this] { add({"folder/new"}); });
-    expectRefused([this] { remove({"file"}); });
-    expectRefused([this] { markResolved("file"); });
-    expectRefused([this] { revert({"file"}); });
-    expectRefused([this] { commit(); });
-    expectRefused([&] { branches->switchBranch("topic"); });
-    EXPECT_THROW(branches->merge("topic"), vclink::git::GitException);
-    EXPECT_EQ(repository_.read("file"), "edited\n");
+    expectEachOperationRefused("folder/new");
     repository_.write("folder/.gitignore", "*.o\n");
     add({"folder/new"});
     EXPECT_THAT(status(), testing::Contains("A  folder/new"));

@@ -137,6 +137,10 @@ class MovedTarget : public MovedHead
         makeBranch("later", writes("file", "theirs, later\n"), "topic");
         repository_.git({"symbolic-ref", "refs/heads/alias", "refs/heads/topic"});
     }
+    void moveTopic(const std::string &commit) const
+    {
+        repository_.git({"branch", "--force", "topic", commit});
+    }
     Failure failureOfSwitch(const std::string &name) const
     {
         return failureOf([&] { branches().switchBranch(name); });
@@ -155,10 +159,7 @@ TEST_F(MovedTarget, RefusesASwitchBeforeItWrites)
         const std::string before = idOf("topic");
         {
             LibGit2Recorder calls;
-            calls.on<git_transaction_new>(
-                [this](auto...) {
-                    repository_.git({"branch", "--force", "topic", "later"});
-                });
+            calls.on<git_transaction_new>([this](auto...) { moveTopic("later"); });
             EXPECT_EQ(failureOfSwitch(name), moved(name, "nothing has been changed, try again"));
         }
         EXPECT_EQ(currentBranch(), "refs/heads/main");
@@ -168,7 +169,7 @@ TEST_F(MovedTarget, RefusesASwitchBeforeItWrites)
         EXPECT_EQ(repository_.read("file"), "theirs, later\n");
         EXPECT_THAT(status(), IsEmpty());
         branches().switchBranch("main");
-        repository_.git({"branch", "--force", "topic", before});
+        moveTopic(before);
     }
 }
 
@@ -179,10 +180,7 @@ TEST_F(MovedTarget, LeavesHeadIfASwitchHasWritten)
         const std::string before = idOf("topic");
         {
             LibGit2Recorder calls;
-            calls.on<git_checkout_tree>(
-                [this](auto...) {
-                    repository_.git({"branch", "--force", "topic", "later"});
-                });
+            calls.on<git_checkout_tree>([this](auto...) { moveTopic("later"); });
             EXPECT_EQ(failureOfSwitch(name), moved(name, "its files have been written, but HEAD "
                                                          "has not moved: see 'git status'"));
         }
@@ -191,7 +189,7 @@ TEST_F(MovedTarget, LeavesHeadIfASwitchHasWritten)
         EXPECT_EQ(idOf("topic"), idOf("later"));
         EXPECT_FALSE(exists(".git/index.lock"));
         repository_.git({"reset", "--quiet", "--hard"});
-        repository_.git({"branch", "--force", "topic", before});
+        moveTopic(before);
     }
 }
 
@@ -204,7 +202,7 @@ TEST_F(MovedTarget, IsNotMissedWhileASwitchAwaitsHead)
         {
             if (!std::exchange(isFirst, false))
                 return setHead(arguments...);
-            repository_.git({"branch", "--force", "topic", "later"});
+            moveTopic("later");
             return int{GIT_ELOCKED};
         });
     EXPECT_EQ(failureOfSwitch("topic").code, GIT_EMODIFIED);

@@ -189,6 +189,17 @@ TEST_F(FetchObstacles, KeepCommitsInAShallowRepository)
     EXPECT_EQ(idOf("own"), idOf("main", author_));
 }
 
+/// With 1.9, a fetch that is killed can leave such a file behind.
+TEST_F(FetchObstacles, TakeAnEmptyListOfTheOldestCommitsForNone)
+{
+    start();
+    repository_.write(".git/shallow", "");
+    const std::string own = idOf("own");
+    fetch({"refs/heads/main:refs/heads/own", "refs/heads/main:refs/heads/copy"});
+    EXPECT_EQ(idOf("own"), own);
+    EXPECT_EQ(idOf("copy"), idOf("main", author_));
+}
+
 /// There, libgit2 does not see that the repository is shallow.
 TEST_F(FetchObstacles, KeepCommitsInALinkedWorkingTreeOfAShallowRepository)
 {
