@@ -73,6 +73,7 @@ CheckoutWatch::CheckoutWatch(CheckoutKind kind, git_repository *repository,
 {
     const char *const workdir = git_repository_workdir(repository);
     root_ = workdir != nullptr ? workdir : "";
+    path_ = root_;
     record.notify_cb = pass;
     record.notify_payload = this;
     record.progress_cb = passProgress;

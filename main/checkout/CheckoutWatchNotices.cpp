@@ -24,6 +24,8 @@ namespace
 
 using NoticeRule = Finding (*)(WorkingCopy &, const CheckoutNotice &);
 
+// Not for what libgit2 has seen in the place of a file of HEAD: the look before the switch has
+// judged that.
 constexpr std::array<NoticeRule, 2> switchNoticeRules{findUnseen, findMissingFile};
 constexpr std::array<NoticeRule, 7> mergeNoticeRules{
     findEdit,          findUnseen,           findUntrackedNoticed, findForeignInFolderNoticed,
@@ -96,7 +98,8 @@ Finding CheckoutWatch::noteOverwritten(const CheckoutNotice &notice)
         return lacking;
     }
     const bool isExecutable = notice.target->mode == GIT_FILEMODE_BLOB_EXECUTABLE;
-    const std::string reason = remade_.note(path_.assign(root_).append(notice.path), isExecutable);
+    path_.replace(root_.size(), std::string::npos, notice.path);
+    const std::string reason = remade_.note(path_, isExecutable);
     attributes_.note(path_, *notice.target);
     return reason.empty()
                ? Finding()
@@ -152,6 +155,11 @@ int CheckoutWatch::answer(const Finding &found)
 
 Finding CheckoutWatch::judge(const CheckoutNotice &notice)
 {
+    const bool isSeen = notice.baseline != nullptr && notice.workdir != nullptr;
+    if (kind_ != CheckoutKind::Merge && isSeen)
+    {
+        return {};
+    }
     Finding found = kind_ == CheckoutKind::Merge ? ask(mergeNoticeRules, *copy_, notice)
                                                  : ask(switchNoticeRules, *copy_, notice);
     if (!found)

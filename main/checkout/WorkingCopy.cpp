@@ -4,6 +4,7 @@
 #include <algorithm>
 #include <cstddef>
 #include <cstring>
+#include <string_view>
 #include <utility>
 
 #include <git2.h>
@@ -33,11 +34,12 @@ std::string workdirOf(git_repository *repository)
     return workdir != nullptr ? workdir : "";
 }
 
-bool isDirectlyIn(const std::string &folder, const std::string &name)
+/// Views, because the compiler inlines their functions: this runs several times for each file.
+bool isDirectlyIn(std::string_view folder, std::string_view name)
 {
     const std::size_t size = folder.size();
-    return name.size() > size && name[size] == '/' && name.compare(0, size, folder) == 0 &&
-           name.find('/', size + 1) == std::string::npos;
+    return name.size() > size && name[size] == '/' && name.substr(0, size) == folder &&
+           name.find('/', size + 1) == std::string_view::npos;
 }
 
 } // namespace
@@ -80,7 +82,7 @@ Standing WorkingCopy::at(const std::string &name)
 
 const struct stat &WorkingCopy::statusOf(const std::string &name)
 {
-    if (!isKnown_ || path_.compare(root_.size(), std::string::npos, name) != 0)
+    if (!isKnown_ || std::string_view(path_).substr(root_.size()) != name)
     {
         at(name);
     }
@@ -157,7 +159,8 @@ void WorkingCopy::forget()
 {
     ways_.clear();
     wayToFolder_ = nullptr;
-    asked_.clear();
+    entry_ = nullptr;
+    missing_.clear();
     examined_.reset();
     hasHidden_.reset();
     isKnown_ = false;
@@ -219,20 +222,39 @@ void WorkingCopy::readModulesFor(const TreeChange &change) const
 
 const git_index_entry *WorkingCopy::entryOf(const std::string &name)
 {
-    if (asked_.empty() || asked_ != name)
+    if (entry_ != nullptr && std::strcmp(entry_->path, name.c_str()) == 0)
     {
-        entry_ = findEntry(name.c_str());
-        asked_ = name;
+        return entry_;
+    }
+    if (!missing_.empty() && missing_ == name)
+    {
+        return nullptr;
+    }
+    entry_ = findEntry(name.c_str());
+    if (entry_ == nullptr)
+    {
+        missing_ = name;
     }
     return entry_;
 }
 
-/// Searches from the last place on, in growing steps, because names come in the order of the index.
-/// libgit2 calculates a hash of each name. It is asked for what is not found, because it may treat
-/// upper and lower case as equal.
+/// Names come in the order of the index, and often one after the other. Otherwise, searches from
+/// the last place on in growing steps. libgit2 calculates a hash of each name. It is asked for what
+/// is not found, because it may treat upper and lower case as equal.
 const git_index_entry *WorkingCopy::findEntry(const char *name)
 {
     git_index *const index = index_.get();
+    const auto isOfName = [name](const git_index_entry *entry)
+    {
+        return entry != nullptr && GIT_INDEX_ENTRY_STAGE(entry) == GIT_INDEX_STAGE_NORMAL &&
+               std::strcmp(entry->path, name) == 0;
+    };
+    const git_index_entry *const next = git_index_get_byindex(index, place_);
+    if (isOfName(next))
+    {
+        ++place_;
+        return next;
+    }
     const auto isBefore = [index, name](std::size_t place)
     { return std::strcmp(git_index_get_byindex(index, place)->path, name) < 0; };
     const std::size_t count = git_index_entrycount(index);
@@ -251,9 +273,7 @@ const git_index_entry *WorkingCopy::findEntry(const char *name)
         (isAfter ? last : first) = isAfter ? middle : middle + 1;
     }
     const git_index_entry *const entry = git_index_get_byindex(index, first);
-    const bool isFound = entry != nullptr &&
-                         GIT_INDEX_ENTRY_STAGE(entry) == GIT_INDEX_STAGE_NORMAL &&
-                         std::strcmp(entry->path, name) == 0;
+    const bool isFound = isOfName(entry);
     place_ = isFound ? first + 1 : first;
     return isFound ? entry : git_index_get_bypath(index, name, GIT_INDEX_STAGE_NORMAL);
 }

@@ -150,9 +150,9 @@ class WorkingCopy
     /// The folder that was looked at last, and the way to it; null for none.
     std::string folder_;
     const Way *wayToFolder_ = nullptr;
-    /// The name whose entry was asked for last; empty for none.
-    std::string asked_;
+    /// The entry that was asked for last, null for none, and the last name without one.
     const git_index_entry *entry_ = nullptr;
+    std::string missing_;
     /// Where the last search in the index ended.
     std::size_t place_ = 0;
     std::optional<bool> hasHidden_;
