@@ -2,13 +2,12 @@
 #include "main/checkout/mountPoints.hpp"
 
 #include <cstddef>
-#include <fstream>
-#include <iterator>
 
 #include <git2/tree.h>
 
 #include "main/checkout/treeChanges.hpp"
 #include "util/repository/objectIds.hpp"
+#include "util/scope/wholeFile.hpp"
 
 namespace vclink::git
 {
@@ -82,10 +81,10 @@ std::vector<std::string> findMountPointsBelow(std::string_view mounts, const std
 
 std::vector<std::string> mountPointsBelow(const std::string &root)
 {
-    std::ifstream file("/proc/self/mountinfo", std::ios::binary);
-    const std::string mounts{std::istreambuf_iterator<char>(file),
-                             std::istreambuf_iterator<char>()};
-    return findMountPointsBelow(mounts, root);
+    // Without /proc, nothing is known.
+    std::string mounts;
+    const bool isRead = readWholeFile("/proc/self/mountinfo", mounts) == 0;
+    return isRead ? findMountPointsBelow(mounts, root) : std::vector<std::string>();
 }
 
 Obstacle mountedAt(const std::string &name)

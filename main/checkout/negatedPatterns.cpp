@@ -3,8 +3,8 @@
 
 #include <cstddef>
 #include <cstdlib>
-#include <fstream>
 #include <memory>
+#include <sstream>
 
 #include <fnmatch.h>
 #include <git2/buffer.h>
@@ -15,6 +15,7 @@
 
 #include "error/errorUtil/GitResult.hpp"
 #include "main/checkout/standing.hpp"
+#include "util/scope/wholeFile.hpp"
 
 namespace vclink::git
 {
@@ -121,12 +122,13 @@ bool mayNegate(const std::string &path, const Name &name)
     {
         return true;
     }
-    std::ifstream file(path);
-    if (!file)
+    std::string content;
+    if (readWholeFile(path, content) != 0)
     {
         return standingAt(path) != Standing::Nothing;
     }
-    for (std::string line; std::getline(file, line);)
+    std::istringstream text(content);
+    for (std::string line; std::getline(text, line);)
     {
         if (line.rfind(byteOrderMark, 0) == 0)
         {
@@ -141,7 +143,7 @@ bool mayNegate(const std::string &path, const Name &name)
             return true;
         }
     }
-    return file.bad();
+    return false;
 }
 
 /// Returns the setting, empty if there is none.

@@ -72,4 +72,9 @@ TEST_F(Repository, WritesSourcePositionsOfTheLibraryAsText)
     EXPECT_THAT(findLineMacros(tree), IsEmpty());
 }
 
+TEST_F(Repository, LetsNoCommandInheritAFileThatTheLibraryReads)
+{
+    EXPECT_THAT(findFileStreams(tree), IsEmpty());
+}
+
 } // namespace

@@ -282,4 +282,12 @@ TEST(LineMacros, AreNotForTheLibrary)
     EXPECT_THAT(findLineMacros(makeTreeWith("host/src/logger.cpp", "__LINE__\n")), IsEmpty());
 }
 
+TEST(FileStreams, AreNotForTheLibrary)
+{
+    EXPECT_THAT(findFileStreams(makeTreeWith("util/lines.cpp", "#include <fstream>\n")),
+                ElementsAre("util/lines.cpp includes fstream"));
+    EXPECT_THAT(findFileStreams(makeTreeWith("examples/texts.cpp", "#include <fstream>\n")),
+                IsEmpty());
+}
+
 } // namespace

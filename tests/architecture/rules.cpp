@@ -42,8 +42,8 @@ const std::vector<Room> &rooms()
         {"error", {"error/logging"}},
         {"options", {}},
         {"util/path", {}},
-        {"util/repository", {"util/path"}},
         {"util/scope", {}},
+        {"util/repository", {"util/path", "util/scope"}},
         {"util/lock", {"util/repository", "util/scope"}},
         {"util/command", {"util/scope"}},
         {"util", {"util/command", "util/scope"}},
@@ -283,6 +283,18 @@ Findings findLineMacros(const SourceTree &tree)
     {
         if (isOfLibrary(file) && content.find("__LINE__") != std::string::npos)
             findings.push_back(file + " uses __LINE__");
+    }
+    return findings;
+}
+
+Findings findFileStreams(const SourceTree &tree)
+{
+    Findings findings;
+    for (const auto &[file, content] : tree)
+    {
+        const auto names = findIncludes(content);
+        if (isOfLibrary(file) && std::find(names.begin(), names.end(), "fstream") != names.end())
+            findings.push_back(included(file, "fstream"));
     }
     return findings;
 }

@@ -42,4 +42,7 @@ Findings findHeadersWithoutProlog(const SourceTree &tree);
 /// Source positions in the library are literal text, which no edit above them moves.
 Findings findLineMacros(const SourceTree &tree);
 
+/// The library opens no file as a stream: a command of another thread would inherit the descriptor.
+Findings findFileStreams(const SourceTree &tree);
+
 } // namespace vclink::test

@@ -5,9 +5,9 @@
 #include <cerrno>
 #include <cstddef>
 #include <cstring>
-#include <fstream>
 #include <iterator>
 #include <map>
+#include <sstream>
 #include <utility>
 
 #include <fcntl.h>
@@ -24,6 +24,7 @@
 #include "error/errorUtil/callbackException.hpp"
 #include "error/errorUtil/libgit2Errors.hpp"
 #include "error/errorUtil/raiseGitError.hpp"
+#include "util/scope/wholeFile.hpp"
 
 namespace vclink::git
 {
@@ -181,10 +182,15 @@ bool goesOn(const std::string &line, bool &isQuoted)
 /// libgit2 would write twice, or keep although it is to be removed.
 void refuseWhatLibGit2CannotWrite(const std::string &path)
 {
-    std::ifstream file(path, std::ios_base::binary);
+    std::string content;
+    if (readWholeFile(path, content) != 0)
+    {
+        raiseUnreadable(path);
+    }
+    std::istringstream text(content);
     bool isContinued = false;
     bool isQuoted = false;
-    for (std::string line; std::getline(file, line); isContinued = goesOn(line, isQuoted))
+    for (std::string line; std::getline(text, line); isContinued = goesOn(line, isQuoted))
     {
         if (line.find('\0') != std::string::npos)
         {
@@ -200,10 +206,6 @@ void refuseWhatLibGit2CannotWrite(const std::string &path)
                               line.substr(0, line.find(']') + 1) +
                               "': remove the branch with 'git branch'");
         }
-    }
-    if (!file.eof())
-    {
-        raiseUnreadable(path);
     }
 }
 

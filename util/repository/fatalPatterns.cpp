@@ -2,8 +2,6 @@
 #include "util/repository/fatalPatterns.hpp"
 
 #include <algorithm>
-#include <fstream>
-#include <iterator>
 #include <string_view>
 
 #include <git2/errors.h>
@@ -13,6 +11,7 @@
 
 #include "error/errorUtil/GitResult.hpp"
 #include "error/errorUtil/raiseGitError.hpp"
+#include "util/scope/wholeFile.hpp"
 
 namespace vclink::git
 {
@@ -151,8 +150,8 @@ std::string textOf(const std::string &path)
     {
         return {};
     }
-    std::ifstream file(path, std::ios::binary);
-    return {std::istreambuf_iterator<char>(file), std::istreambuf_iterator<char>()};
+    std::string text;
+    return readWholeFile(path, text) == 0 ? text : std::string();
 }
 
 void refuseFatalPatternsIn(const std::string &path, PatternPlace place)

@@ -2,38 +2,26 @@
 #include "util/repository/linesOf.hpp"
 
 #include <cerrno>
-#include <fstream>
+#include <sstream>
 
 #include "error/errorUtil/raiseSystemError.hpp"
+#include "util/scope/wholeFile.hpp"
 
 namespace vclink::git
 {
-namespace
-{
-
-[[noreturn]] void raiseUnreadFile(const std::string &path, int error)
-{
-    raiseSystemError(error, "could not read '" + path + "'");
-}
-
-} // namespace
-
 std::vector<std::string> linesOf(const std::string &path)
 {
-    errno = 0;
-    std::ifstream file(path);
-    if (!file && errno != ENOENT && errno != ENOTDIR)
+    std::string content;
+    const int error = readWholeFile(path, content);
+    if (error != 0 && error != ENOENT && error != ENOTDIR)
     {
-        raiseUnreadFile(path, errno);
+        raiseSystemError(error, "could not read '" + path + "'");
     }
+    std::istringstream text(content);
     std::vector<std::string> lines;
-    for (std::string line; std::getline(file, line);)
+    for (std::string line; std::getline(text, line);)
     {
         lines.push_back(line);
-    }
-    if (file.bad())
-    {
-        raiseUnreadFile(path, EIO);
     }
     return lines;
 }
