@@ -51,6 +51,7 @@ std::vector<OwnedHandle<git_commit>> lookupMergeHeads(git_repository *repository
 {
     std::vector<git_oid> ids;
     check(git_repository_mergehead_foreach, repository, collectMergeHead, &ids);
+    refuseDamagedMergeHead(repository);
     std::vector<OwnedHandle<git_commit>> commits;
     commits.reserve(ids.size());
     for (const git_oid &id : ids)

@@ -35,6 +35,12 @@ std::string lineOf(const git_oid &id)
     return line;
 }
 
+/// After a power failure, a file can have NUL bytes in place of its content.
+bool isIdLine(const std::string &line)
+{
+    return line.find_first_not_of("0123456789abcdef") == idTextSize && line.back() == '\n';
+}
+
 /// Returns the id and the line end of such a file, empty if there is none.
 std::string readIdLine(const std::string &path)
 {
@@ -86,8 +92,8 @@ bool hasMergeMarker(git_repository *repository, const git_oid &theirs)
         raiseSystemError(errno, "could not read '" + path + "'");
     }
     const bool isWhole = static_cast<std::size_t>(size) == text.size();
-    const std::string marker(text.data(), text.size());
-    return !isWhole || marker.substr(marker.size() / 2) == lineOf(theirs);
+    const std::string line = std::string(text.data(), text.size()).substr(idLineSize);
+    return !isWhole || !isIdLine(line) || line == lineOf(theirs);
 }
 
 void removeMergeMarker(git_repository *repository) noexcept

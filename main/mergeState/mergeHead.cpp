@@ -1,26 +1,41 @@
 // SPDX-License-Identifier: MIT
 #include "main/mergeState/mergeHead.hpp"
 
+#include <array>
 #include <cerrno>
+#include <cstddef>
+#include <cstring>
 #include <string>
 
+#include <fcntl.h>
 #include <git2/commit.h>
 #include <git2/errors.h>
 #include <git2/oid.h>
 #include <git2/repository.h>
+#include <unistd.h>
 
 #include "error/errorUtil/raiseGitError.hpp"
 #include "error/errorUtil/raiseSystemError.hpp"
 #include "util/repository/objectIds.hpp"
 #include "util/repository/repository.hpp"
+#include "util/scope/FileDescriptor.hpp"
 #include "util/scope/newFile.hpp"
 
 namespace vclink::git
 {
+namespace
+{
+
+std::string mergeHeadPath(git_repository *repository)
+{
+    return git_repository_path(repository) + std::string("MERGE_HEAD");
+}
+
+} // namespace
 
 void restoreMergeHead(git_repository *repository, const git_oid &theirs)
 {
-    const std::string path = git_repository_path(repository) + std::string("MERGE_HEAD");
+    const std::string path = mergeHeadPath(repository);
     std::string line(idTextSize + 1, '\n');
     git_oid_fmt(line.data(), &theirs);
     const int error = createFile(path, line);
@@ -38,6 +53,28 @@ void refuseCommitWithoutMergeHead(git_repository *repository, int state)
                       "'git rebase' has stopped at a merge, and the commit would lack the history "
                       "of the other side: conclude the merge with 'git commit', or the rebase with "
                       "'git rebase --continue'");
+    }
+}
+
+void refuseDamagedMergeHead(git_repository *repository)
+{
+    const std::string path = mergeHeadPath(repository);
+    const FileDescriptor file(::open(path.c_str(), O_RDONLY | O_CLOEXEC));
+    std::array<char, 4096> text{};
+    ssize_t size = -1;
+    while (file && (size = ::read(file.get(), text.data(), text.size())) > 0)
+    {
+        if (std::memchr(text.data(), '\0', static_cast<std::size_t>(size)) != nullptr)
+        {
+            raiseGitError(GIT_ERROR, GIT_ERROR_MERGE,
+                          "MERGE_HEAD is damaged, and the commit would lack the history of the "
+                          "other side: write the id of the merged commit into '" +
+                              path + "', or abort the merge with 'git merge --abort'");
+        }
+    }
+    if (size < 0)
+    {
+        raiseSystemError(errno, "could not read '" + path + "'");
     }
 }
 

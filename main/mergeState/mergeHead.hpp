@@ -23,6 +23,11 @@ void restoreMergeHead(git_repository *repository, const git_oid &theirs);
 /// @throws LibGit2Exception
 void refuseCommitWithoutMergeHead(git_repository *repository, int state);
 
+/// Refuses a commit that would lack parents because MERGE_HEAD has NUL bytes, for example after a
+/// power failure: libgit2 reads up to the first one, and reports no error.
+/// @throws LibGit2Exception also if the file cannot be read
+void refuseDamagedMergeHead(git_repository *repository);
+
 /// Refuses a commit that would not belong to this merge, because another process has moved HEAD,
 /// committed the merge or aborted it.
 /// @param parents the parents of the commit

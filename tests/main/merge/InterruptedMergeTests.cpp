@@ -34,6 +34,20 @@ TEST_F(InterruptedMerge, IsToldByAMarkerThatWasCutShortItself)
     expectRefused();
 }
 
+/// A power failure can leave these.
+TEST_F(InterruptedMerge, IsToldByAMarkerThatIsFilledWithNuls)
+{
+    makeDiverged();
+    beginMergeAsLibGit2();
+    const std::string whole = markerOf("main", "topic");
+    repository_.write(mergeMarker, std::string(whole.size(), '\0'));
+    expectRefused();
+    repository_.write(mergeMarker, whole.substr(0, 41) + std::string(41, '\0'));
+    expectRefused();
+    repository_.write(mergeMarker, whole.substr(0, 81) + '\0');
+    expectRefused();
+}
+
 TEST_F(InterruptedMerge, IsNotToldByTheMarkerOfAnother)
 {
     makeDiverged();

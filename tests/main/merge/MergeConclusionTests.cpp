@@ -214,6 +214,33 @@ TEST_F(MergeConclusion, FailsWithAMergeHeadThatIsNone)
     }
 }
 
+/// libgit2 reads up to the first NUL, and reports no error.
+TEST_F(MergeConclusion, FailsWithAMergeHeadThatIsFilledWithNuls)
+{
+    beginMerge({"file"});
+    const std::string theirs = idOf("theirs") + '\n';
+    const std::string nuls(theirs.size(), '\0');
+    std::string manyLines;
+    for (int line = 0; line < 200; ++line)
+        manyLines += theirs;
+    const Failure damaged{GIT_ERROR, GIT_ERROR_MERGE,
+                          "MERGE_HEAD is damaged, and the commit would lack the history of the "
+                          "other side: write the id of the merged commit into '" +
+                              (repository_ / ".git/MERGE_HEAD").string() +
+                              "', or abort the merge with 'git merge --abort'"};
+    for (const std::string &content : {nuls, theirs + nuls, manyLines + nuls, nuls + theirs})
+    {
+        SCOPED_TRACE(content.size());
+        repository_.write(".git/MERGE_HEAD", content);
+        EXPECT_FALSE(repository_.tryGit({"commit", "--quiet", "--all", "--no-edit"}).succeeded());
+        const NothingChanges nothing(repository_);
+        EXPECT_EQ(failureOf([this] { commit(); }), damaged);
+    }
+    repository_.write(".git/MERGE_HEAD", theirs);
+    commit();
+    EXPECT_EQ(parents().size(), 2U);
+}
+
 TEST_F(MergeConclusion, FailsWithAMergeHeadThatCannotBeRead)
 {
     beginMerge({"file"});
