@@ -112,14 +112,17 @@ void GitAdapter::commit(const upath & /*folder*/, const ustring &message)
     {
         refuseOtherParents(*expectedMerge_, parents);
     }
-    else if (state == GIT_REPOSITORY_STATE_NONE)
-    {
-        removeMergeMarker(repository.get());
-    }
     else
     {
         refuseCommitWithAutostash(repository.get());
-        refuseCommitWithoutMergeHead(repository.get(), state);
+        if (state == GIT_REPOSITORY_STATE_NONE)
+        {
+            removeMergeMarker(repository.get());
+        }
+        else
+        {
+            refuseCommitWithoutMergeHead(repository.get(), state);
+        }
     }
     if (expectedMerge_ == nullptr && headCommit != nullptr && mergeHeads.size() == 1)
     {

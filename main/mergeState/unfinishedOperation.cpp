@@ -45,6 +45,22 @@ const char *describe(int state)
     }
 }
 
+/// Returns true if git has put changes of the user aside, or if that cannot be examined. After a
+/// squash, no operation is under way then.
+bool hasAutostash(git_repository *repository)
+{
+    const std::string folder = git_repository_path(repository);
+    for (const char *const file :
+         {"MERGE_AUTOSTASH", "rebase-merge/autostash", "rebase-apply/autostash"})
+    {
+        if (::access((folder + file).c_str(), F_OK) == 0 || (errno != ENOENT && errno != ENOTDIR))
+        {
+            return true;
+        }
+    }
+    return false;
+}
+
 bool isNeeded(const WorkingTree &tree, const std::string &branch)
 {
     return tree.returnsTo(branch) || tree.moves(branch);
@@ -65,23 +81,23 @@ void refuseSwitchInUnfinishedOperation(git_repository *repository)
                       std::string("cannot switch branches while ") + operation +
                           " is under way: conclude or abort it first, see git status");
     }
+    if (hasAutostash(repository))
+    {
+        raiseGitError(GIT_ECONFLICT, GIT_ERROR_CHECKOUT,
+                      "cannot switch branches while uncommitted changes are put aside, because "
+                      "only git brings them back (--autostash): conclude the merge with 'git "
+                      "commit', or use 'git switch', which moves them to the stash");
+    }
 }
 
 void refuseCommitWithAutostash(git_repository *repository)
 {
-    const std::string folder = git_repository_path(repository);
-    for (const char *const file :
-         {"MERGE_AUTOSTASH", "rebase-merge/autostash", "rebase-apply/autostash"})
+    if (hasAutostash(repository))
     {
-        // If it cannot be examined, it may exist.
-        if (::access((folder + file).c_str(), F_OK) == 0 || (errno != ENOENT && errno != ENOTDIR))
-        {
-            raiseGitError(
-                GIT_ERROR, GIT_ERROR_REPOSITORY,
-                "'git merge' or 'git rebase' has put uncommitted changes aside (--autostash), "
-                "and only git brings them back: conclude it with 'git commit' or 'git rebase "
-                "--continue'");
-        }
+        raiseGitError(GIT_ERROR, GIT_ERROR_REPOSITORY,
+                      "'git merge' or 'git rebase' has put uncommitted changes aside "
+                      "(--autostash), and only git brings them back: conclude it with 'git commit' "
+                      "or 'git rebase --continue'");
     }
 }
 

@@ -8,13 +8,13 @@ namespace vclink::git
 
 /// Throws if a merge, revert, cherry-pick, rebase or an application of patches is under way. After
 /// a switch it would be concluded on the other branch, and count work as merged that is not there,
-/// or drop commits. A bisection may go on.
+/// or drop commits. Also throws after `git merge --squash --autostash`. A bisection may go on.
 /// @throws LibGit2Exception also if the state cannot be read
 void refuseSwitchInUnfinishedOperation(git_repository *repository);
 
-/// Throws if git has put changes of the user aside for the merge or rebase that is under way, with
-/// --autostash. git brings them back when it concludes the operation; after another conclusion only
-/// `git fsck` would find them.
+/// Throws if git has put changes of the user aside for the merge, squash or rebase that the commit
+/// would conclude, with --autostash. git brings them back when it concludes the operation; after
+/// another conclusion only `git fsck` would find them.
 /// @throws LibGit2Exception
 void refuseCommitWithAutostash(git_repository *repository);
 

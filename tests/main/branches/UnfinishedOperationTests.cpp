@@ -176,6 +176,29 @@ TEST_F(UnfinishedSeries, IsKeptByTheCommitOfAMerge)
     expectRest();
 }
 
+/// libgit2 sees nothing under way.
+TEST_F(Unfinished, SquashKeepsWhatGitHasPutAside)
+{
+    repository_.write("other", "mine\n");
+    repository_.git({"merge", "--quiet", "--squash", "--autostash", "aside"});
+    ASSERT_NE(repository_.read("other"), "mine\n");
+    ASSERT_EQ(branches().getRepositoryState(), "Normal");
+    {
+        const NothingChanges nothing(repository_);
+        EXPECT_EQ(failureOf([this] { branches().switchBranch("other-branch"); }),
+                  (Failure{GIT_ECONFLICT, GIT_ERROR_CHECKOUT,
+                           "cannot switch branches while uncommitted changes are put aside, "
+                           "because only git brings them back (--autostash): conclude the merge "
+                           "with 'git commit', or use 'git switch', which moves them to the "
+                           "stash"}));
+    }
+    const GitRepository twin = makeTwin();
+    twin.git({"switch", "--quiet", "other-branch"});
+    EXPECT_NE(twin.git({"stash", "list"}), "");
+    repository_.git({"commit", "--quiet", "--no-edit"});
+    EXPECT_EQ(repository_.read("other"), "mine\n");
+}
+
 /// git takes no notice of such a file.
 TEST_F(Unfinished, IsNoSeriesWithoutSteps)
 {

@@ -230,6 +230,7 @@ TEST_P(PutAside, ChangesOfTheUserComeBackWithGit)
 INSTANTIATE_TEST_SUITE_P(
     By, PutAside,
     testing::Values(std::vector<std::string>{"merge", "--autostash", "theirs"},
+                    std::vector<std::string>{"merge", "--squash", "--autostash", "theirs"},
                     std::vector<std::string>{"rebase", "--autostash", "theirs"},
                     std::vector<std::string>{"rebase", "--apply", "--autostash", "theirs"}));
 
