@@ -2,6 +2,7 @@
 #include "util/repository/repository.hpp"
 
 #include <cerrno>
+#include <initializer_list>
 #include <string>
 
 #include <git2.h>
@@ -83,16 +84,35 @@ void useWorkingTree(git_repository *repository, const std::string &folder)
     check(git_repository_set_workdir, repository, folder.c_str(), 0);
 }
 
-/// Removes what git_repository_state_cleanup would, except for the series.
-void endMergeInSeries(git_repository *repository)
+void removeFiles(git_repository *repository, std::initializer_list<const char *> names)
 {
-    for (const char *const name : {"MERGE_HEAD", "MERGE_MODE", "MERGE_MSG"})
+    for (const char *const name : names)
     {
         const std::string path = git_repository_path(repository) + std::string(name);
         if (::unlink(path.c_str()) != 0 && errno != ENOENT)
         {
             raiseSystemError(errno, "could not remove '" + path + "'");
         }
+    }
+}
+
+void endOperation(git_repository *repository)
+{
+    if (isInSeries(repository))
+    {
+        const int state = readRepositoryState(repository);
+        if (state == GIT_REPOSITORY_STATE_NONE || state == GIT_REPOSITORY_STATE_MERGE)
+        {
+            // What git_repository_state_cleanup would remove, except for the series.
+            removeFiles(repository, {"MERGE_HEAD", "MERGE_MODE", "MERGE_MSG"});
+            return;
+        }
+    }
+    check(git_repository_state_cleanup, repository);
+    // Otherwise the next commit would be part of the same merge.
+    if (hasMergeHead(repository))
+    {
+        check(git_repository_state_cleanup, repository);
     }
 }
 
@@ -161,21 +181,10 @@ bool isInSeries(git_repository *repository)
 
 void cleanUpRepositoryState(git_repository *repository)
 {
-    if (isInSeries(repository))
-    {
-        const int state = readRepositoryState(repository);
-        if (state == GIT_REPOSITORY_STATE_NONE || state == GIT_REPOSITORY_STATE_MERGE)
-        {
-            endMergeInSeries(repository);
-            return;
-        }
-    }
-    check(git_repository_state_cleanup, repository);
-    // Otherwise the next commit would be part of the same merge.
-    if (hasMergeHead(repository))
-    {
-        check(git_repository_state_cleanup, repository);
-    }
+    endOperation(repository);
+    // Otherwise git would take the next commit for the resolution of these conflicts, and its
+    // message from the squash.
+    removeFiles(repository, {"MERGE_RR", "SQUASH_MSG"});
 }
 
 bool isShallow(git_repository *repository)

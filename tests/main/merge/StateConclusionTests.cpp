@@ -234,6 +234,52 @@ INSTANTIATE_TEST_SUITE_P(
                     std::vector<std::string>{"rebase", "--autostash", "theirs"},
                     std::vector<std::string>{"rebase", "--apply", "--autostash", "theirs"}));
 
+/// What git begins, stops at a conflict in "file" and has listed it for `git rerere`.
+class ReusedResolution : public StateConclusion,
+                         public testing::WithParamInterface<std::vector<std::string>>
+{
+};
+
+/// git records the text of "file" in the next commit if the list is still there.
+TEST_P(ReusedResolution, IsNotThatOfALaterCommit)
+{
+    for (const auto *const setting : {"rerere.enabled", "rerere.autoUpdate"})
+        repository_.git({"config", setting, "true"});
+    const std::string before = idOf("HEAD");
+    stopAt(GetParam());
+    ASSERT_NE(repository_.read(".git/MERGE_RR"), "");
+    repository_.write("file", "resolved\n");
+    commit();
+    EXPECT_FALSE(exists("MERGE_RR"));
+    repository_.write("file", "later\n");
+    repository_.git({"commit", "--quiet", "--all", "--message=later"});
+    repository_.git({"reset", "--quiet", "--hard", before});
+    stopAt(GetParam());
+    EXPECT_THAT(repository_.read("file"), testing::HasSubstr("<<<<<<<"));
+}
+
+INSTANTIATE_TEST_SUITE_P(By, ReusedResolution,
+                         testing::Values(std::vector<std::string>{"merge", "theirs"},
+                                         std::vector<std::string>{"merge", "--squash", "theirs"},
+                                         std::vector<std::string>{"cherry-pick", "theirs"},
+                                         std::vector<std::string>{"rebase", "theirs"}));
+
+/// git takes it for the message of the next commit.
+TEST_F(StateConclusion, RemovesTheMessageOfASquash)
+{
+    repository_.git({"branch", "aside", "main^"});
+    repository_.git({"checkout", "--quiet", "aside"});
+    repository_.commitAll(writes("aside", "aside\n"), "aside");
+    repository_.git({"checkout", "--quiet", "main"});
+    repository_.git({"merge", "--quiet", "--squash", "aside"});
+    ASSERT_TRUE(exists("SQUASH_MSG"));
+    commit();
+    EXPECT_EQ(committed("aside"), "aside\n");
+    EXPECT_FALSE(exists("SQUASH_MSG"));
+    repository_.write("file", "edited\n");
+    EXPECT_FALSE(repository_.command({"commit", "--all", "--no-edit"}).run().succeeded());
+}
+
 TEST_F(StateConclusion, LeavesWhatIsLeftOfAFormerMergeAlone)
 {
     repository_.write(".git/ORIG_HEAD", idOf("theirs") + '\n');
