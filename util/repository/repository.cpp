@@ -2,8 +2,10 @@
 #include "util/repository/repository.hpp"
 
 #include <cerrno>
+#include <filesystem>
 #include <initializer_list>
 #include <string>
+#include <system_error>
 
 #include <git2.h>
 #include <sys/stat.h>
@@ -84,29 +86,50 @@ void useWorkingTree(git_repository *repository, const std::string &folder)
     check(git_repository_set_workdir, repository, folder.c_str(), 0);
 }
 
-void removeFiles(git_repository *repository, std::initializer_list<const char *> names)
+constexpr std::initializer_list<const char *> filesOfMerge{"MERGE_HEAD", "MERGE_MODE", "MERGE_MSG"};
+
+/// What else git_repository_state_cleanup removes, except for the log of a bisection.
+constexpr std::initializer_list<const char *> filesOfOthers{
+    "REVERT_HEAD", "CHERRY_PICK_HEAD", "rebase-merge", "rebase-apply", "sequencer"};
+
+/// Removes files and folders from git's folder.
+void removeState(git_repository *repository, std::initializer_list<const char *> names)
 {
     for (const char *const name : names)
     {
         const std::string path = git_repository_path(repository) + std::string(name);
-        if (::unlink(path.c_str()) != 0 && errno != ENOENT)
+        if (::unlink(path.c_str()) == 0 || errno == ENOENT)
         {
-            raiseSystemError(errno, "could not remove '" + path + "'");
+            continue;
+        }
+        std::error_code error(errno, std::generic_category());
+        if (error == std::errc::is_a_directory)
+        {
+            std::filesystem::remove_all(path, error);
+        }
+        if (error)
+        {
+            raiseSystemError(error.value(), "could not remove '" + path + "'");
         }
     }
 }
 
 void endOperation(git_repository *repository)
 {
-    if (isInSeries(repository))
+    const bool isSeries = isInSeries(repository);
+    const bool isBisection = isThere(git_repository_path(repository) + std::string("BISECT_LOG"));
+    const int state =
+        isSeries || isBisection ? readRepositoryState(repository) : GIT_REPOSITORY_STATE_NONE;
+    if (isSeries && (state == GIT_REPOSITORY_STATE_NONE || state == GIT_REPOSITORY_STATE_MERGE))
     {
-        const int state = readRepositoryState(repository);
-        if (state == GIT_REPOSITORY_STATE_NONE || state == GIT_REPOSITORY_STATE_MERGE)
-        {
-            // What git_repository_state_cleanup would remove, except for the series.
-            removeFiles(repository, {"MERGE_HEAD", "MERGE_MODE", "MERGE_MSG"});
-            return;
-        }
+        removeState(repository, filesOfMerge);
+        return;
+    }
+    if (isBisection && state != GIT_REPOSITORY_STATE_BISECT)
+    {
+        removeState(repository, filesOfMerge);
+        removeState(repository, filesOfOthers);
+        return;
     }
     check(git_repository_state_cleanup, repository);
     // Otherwise the next commit would be part of the same merge.
@@ -184,7 +207,7 @@ void cleanUpRepositoryState(git_repository *repository)
     endOperation(repository);
     // Otherwise git would take the next commit for the resolution of these conflicts, and its
     // message from the squash.
-    removeFiles(repository, {"MERGE_RR", "SQUASH_MSG"});
+    removeState(repository, {"MERGE_RR", "SQUASH_MSG"});
 }
 
 bool isShallow(git_repository *repository)

@@ -47,8 +47,9 @@ bool hasMergeHead(git_repository *repository);
 bool isInSeries(git_repository *repository);
 
 /// Ends what a commit concludes. git_repository_state_cleanup, and again if MERGE_HEAD still
-/// exists; as git does, keeps the rest of a series that the commit is not part of. Also removes the
-/// list of conflicts for `git rerere` and the message of a squash.
+/// exists; as git does, keeps the rest of a series that the commit is not part of, and a bisection
+/// if it concludes something else. Also removes the list of conflicts for `git rerere` and the
+/// message of a squash.
 void cleanUpRepositoryState(git_repository *repository);
 
 /// Returns true if the repository lacks the older part of its history. git_repository_is_shallow

@@ -156,6 +156,39 @@ TEST_F(StateConclusion, EndsABisection)
     EXPECT_FALSE(repository_.tryGit({"bisect", "log"}).succeeded());
 }
 
+/// What git does between two steps of a bisection, up to the commit.
+class DuringABisection : public StateConclusion,
+                         public testing::WithParamInterface<std::vector<std::string>>
+{
+};
+
+TEST_P(DuringABisection, ACommitKeepsTheBisection)
+{
+    for (const auto *content : {"1", "2", "3", "4"})
+        repository_.commitAll(writes("other", content), content);
+    repository_.git({"bisect", "start", "main", "main~4"});
+    const std::string log = repository_.git({"bisect", "log"});
+    static_cast<void>(repository_.tryGit(GetParam()));
+    repository_.write("file", "resolved\n");
+    const std::string head = idOf("HEAD");
+    commit();
+    EXPECT_EQ(idOf("HEAD^"), head);
+    EXPECT_EQ(repository_.git({"bisect", "log"}), log);
+    for (const auto *const name : {"MERGE_HEAD", "MERGE_MODE", "MERGE_MSG", "CHERRY_PICK_HEAD",
+                                   "REVERT_HEAD", "rebase-merge", "sequencer"})
+        EXPECT_FALSE(exists(name)) << name;
+    repository_.git({"bisect", "good", "main~3"});
+    EXPECT_NE(repository_.git({"bisect", "log"}), log);
+}
+
+INSTANTIATE_TEST_SUITE_P(Of, DuringABisection,
+                         testing::Values(std::vector<std::string>{"merge", "--no-commit", "theirs"},
+                                         std::vector<std::string>{"cherry-pick", "theirs"},
+                                         std::vector<std::string>{"cherry-pick", "theirs", "main"},
+                                         std::vector<std::string>{"revert", "--no-commit",
+                                                                  "main~4"},
+                                         std::vector<std::string>{"rebase", "theirs"}));
+
 /// A rebase comes first for libgit2, so that it does not report the merge in it.
 class MergeInARebase : public StateConclusion
 {
