@@ -11,11 +11,14 @@
 #include "Session.hpp"
 #include "arguments.hpp"
 #include "commands.hpp"
+#include "failures.hpp"
+#include "fl/i18n/convert.hpp"
 #include "links.hpp"
 #include "mergeLeftovers.hpp"
 #include "namedPaths.hpp"
 #include "names.hpp"
 #include "refusals.hpp"
+#include "renames.hpp"
 #include "runStoppable.hpp"
 #include "states.hpp"
 #include "texts.hpp"
@@ -55,6 +58,7 @@ class ResolvedCommand : public Command
         }
         refuseStrays(say("Nothing was marked as resolved"), adapter, paths, files,
                      [](FileState::State state) { return state != FileState::Clean; });
+        refuseUntracked(adapter, files);
         const ExitStatus status = runStoppable(session, Stops::Never,
                                                [&]
                                                {
@@ -93,6 +97,36 @@ class ResolvedCommand : public Command
         std::vector<upath> files = addressable(filterFollowed(conflicts, root, false), root);
         files.erase(std::remove_if(files.begin(), files.end(), isLink), files.end());
         return files;
+    }
+
+    /// The back end adds everything in a folder that is in the place of a file in conflict.
+    /// @throws ShellFailure if there are such files that git does not track
+    static void refuseUntracked(CMAdapter &adapter, const std::vector<upath> &files)
+    {
+        for (const upath &file : files)
+        {
+            std::error_code ignored;
+            if (!std::filesystem::is_directory(nativePath(file), ignored))
+            {
+                continue;
+            }
+            FileStateMap untracked = filter(folderStates(adapter, file), [](FileState::State state)
+                                            { return !isTracked(state); });
+            // A submodule is one entry.
+            untracked.erase(file);
+            untracked.erase(upath(file.string() + u'/'));
+            if (!untracked.empty())
+            {
+                const ustring name = wayTo(file, makePath(currentFolder()).string());
+                throw ShellFailure(say(
+                    "Nothing was marked as resolved: a folder is in the place of %1%, and these "
+                    "files in it are not tracked:%2%\nAdd them first if they belong to the "
+                    "solution. Otherwise run this, which leaves the folder as it is:\ngit "
+                    "update-index --force-remove %3%",
+                    quoteName(name), listNames(untracked),
+                    quoteForShell(fl::i18n::ustring_to_utf8(name))));
+            }
+        }
     }
 
     static std::string explain(const upath &root, const NamedPath &named)

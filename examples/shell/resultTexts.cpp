@@ -106,6 +106,16 @@ constexpr Translation resultRows[] = {
     {"only symbolic links are in conflict in it: use \"%1%\"",
      "nur symbolische Links darin stehen in Konflikt: Benutzen Sie \"%1%\"",
      "中で競合しているのはシンボリックリンクだけです。\"%1%\" を使ってください"},
+    {"Nothing was marked as resolved: a folder is in the place of %1%, and these files in it are "
+     "not tracked:%2%\nAdd them first if they belong to the solution. Otherwise run this, which "
+     "leaves the folder as it is:\ngit update-index --force-remove %3%",
+     "Nichts wurde als gelöst markiert: An der Stelle von %1% ist ein Ordner, und diese Dateien "
+     "darin kennt Git\nnicht:%2%\nFügen Sie sie zuerst hinzu, wenn sie zur Lösung gehören. Sonst "
+     "lässt dieser Befehl den Ordner, wie er ist:\ngit update-index --force-remove %3%",
+     "何も解決済みになりませんでした。%1% "
+     "の場所にフォルダーがあり、その中の次のファイルは追跡されていません:%2%"
+     "\n解決に含めるなら、先に追加してください。含めないなら次を実行してください。フォルダーはその"
+     "まま残ります。\ngit update-index --force-remove %3%"},
     {"Nothing was reverted", "Nichts wurde verworfen", "何も元に戻されませんでした"},
     {"There is no change to revert.", "Es gibt keine Änderung zu verwerfen.",
      "元に戻す変更はありません。"},

@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include <gmock/gmock.h>
 
-#include "ChangeFixture.hpp"
+#include "ShellMergeFixture.hpp"
 
 namespace vclink::test
 {
@@ -38,6 +38,47 @@ TEST_F(ShellResolved, MarksOnlyTheFilesInConflictBelowAFolder)
     EXPECT_EQ(letters().at("a"), "M ");
     EXPECT_EQ(letters().at("folder/c"), " M");
     EXPECT_EQ(letters().at("new"), "??");
+}
+
+/// The other branch has a file "dir", the current one has a folder of that name.
+class ShellResolvedFolder : public ShellMergeFixture
+{
+  protected:
+    ShellResolvedFolder()
+    {
+        makeBranch("other", {{"dir", "theirs\n"}});
+        commitFiles({{"dir/ours", "ours\n"}});
+        fail({"merge", "other"});
+        // The file of the other branch, under another name.
+        repository_.git({"clean", "--quiet", "--force"});
+        repository_.write("dir/ours", "edited\n");
+    }
+};
+
+TEST_F(ShellResolvedFolder, AddsNoFileThatNobodyNamed)
+{
+    repository_.write("dir/notes", "");
+    const std::string refusal =
+        "Nothing was marked as resolved: a folder is in the place of dir, and these files in it "
+        "are not tracked:\n  dir/notes\nAdd them first if they belong to the solution. Otherwise "
+        "run this, which leaves the folder as it is:\ngit update-index --force-remove dir\n";
+    EXPECT_EQ(refuse({"resolved", "dir"}), refusal);
+    EXPECT_EQ(refuse({"resolved", "."}), refusal);
+    repository_.git({"update-index", "--force-remove", "dir"});
+    succeed({"commit", "-m", "Merged"});
+    EXPECT_EQ(repository_.git({"ls-tree", "-r", "--name-only", "HEAD", "dir"}), "dir/ours\n");
+    EXPECT_EQ(repository_.git({"show", "HEAD:dir/ours"}), "edited\n");
+    EXPECT_EQ(letters().at("dir/notes"), "??");
+}
+
+TEST_F(ShellResolvedFolder, HasTheFilesThatWereAddedFirst)
+{
+    repository_.write("dir/notes", "");
+    repository_.write("dir/x.ignored", "");
+    succeed({"add", "dir/notes"});
+    succeed({"resolved", "dir"});
+    EXPECT_EQ(repository_.git({"ls-files", "dir"}), "dir/notes\ndir/ours\n");
+    EXPECT_EQ(letters().at("dir/ours"), "M ");
 }
 
 TEST_F(ShellResolved, StagesAFileThatIsInNoConflictToo)
