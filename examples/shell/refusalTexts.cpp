@@ -106,6 +106,16 @@ constexpr Translation refusalRows[] = {
      "何もコミットされませんでした。%1%"
      "\nコミットするとそれが終わり、残りは失われます。それでもコミットするには --as-is "
      "を使ってください。"},
+    {"A commit of another author is being picked. Conclude it with \"git commit\", which keeps the "
+     "author, or\nundo it with \"git cherry-pick --abort\".",
+     "Ein Cherry-Pick des Commits eines anderen Autors läuft. Schließen Sie ihn mit \"git commit\" "
+     "ab, das den\nAutor behält, oder nehmen Sie ihn mit \"git cherry-pick --abort\" zurück.",
+     "別の作者のコミットをチェリーピックしています。作者が保たれる \"git commit\" で完了するか、"
+     "\n\"git cherry-pick --abort\" で取り消してください。"},
+    {"Nothing was committed. %1%\nTo commit it under your own name, use --as-is.",
+     "Nichts wurde committet. %1%\nUm unter Ihrem eigenen Namen zu committen, benutzen Sie "
+     "--as-is.",
+     "何もコミットされませんでした。%1%\n自分の名前でコミットするには --as-is を使ってください。"},
     {"A merge is under way. Conclude it with \"vclink-shell commit\", or undo it with \"git merge "
      "--abort\".",
      "Ein Merge läuft. Schließen Sie ihn mit \"vclink-shell commit\" ab, oder nehmen Sie ihn "

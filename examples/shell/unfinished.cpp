@@ -3,11 +3,13 @@
 
 #include <filesystem>
 #include <fstream>
+#include <optional>
 #include <string>
 #include <system_error>
 #include <vector>
 
 #include "failures.hpp"
+#include "gitProgram.hpp"
 #include "names.hpp"
 #include "texts.hpp"
 #include "vclink/git/BranchManager.hpp"
@@ -82,6 +84,44 @@ bool stands(CMAdapter &adapter, const char *name)
     return fs::exists(stateFolder(nativePath(adapter.getRootFolder())) / name, ignored);
 }
 
+/// Name and address from "NAME <ADDRESS> TIME".
+std::string personOf(const std::string &identity)
+{
+    return identity.substr(0, identity.find('>'));
+}
+
+/// The author of the commit that is being picked, if it can be found out.
+std::optional<std::string> findPickedAuthor(const fs::path &root)
+{
+    const auto commit = runGit(root, {"cat-file", "commit", "CHERRY_PICK_HEAD"});
+    const std::string word = "\nauthor ";
+    const std::size_t begin = commit.value_or("").find(word);
+    return begin == std::string::npos
+               ? std::nullopt
+               : std::optional(personOf(commit->substr(begin + word.size())));
+}
+
+/// Whether another person's commit is being picked. git's commit keeps its author.
+bool isPickOfAnother(CMAdapter &adapter)
+{
+    if (!stands(adapter, "CHERRY_PICK_HEAD"))
+    {
+        return false;
+    }
+    const fs::path root = nativePath(adapter.getRootFolder());
+    const std::optional<std::string> author = findPickedAuthor(root);
+    // The back end does not know the settings of the author alone.
+    return author && *author != personOf(runGit(root, {"-c", "author.name=", "-c",
+                                                       "author.email=", "var", "GIT_AUTHOR_IDENT"})
+                                             .value_or(""));
+}
+
+std::string describePickOfAnother()
+{
+    return say("A commit of another author is being picked. Conclude it with \"git commit\", which "
+               "keeps the author, or\nundo it with \"git cherry-pick --abort\".");
+}
+
 } // namespace
 
 void refuseHalfWay(CMAdapter &adapter)
@@ -97,6 +137,12 @@ void refuseHalfWay(CMAdapter &adapter)
         throw ShellFailure(say("Nothing was committed. %1%\nA commit would end it, and lose its "
                                "other steps. To commit nevertheless, use --as-is.",
                                operation));
+    }
+    if (isPickOfAnother(adapter))
+    {
+        throw ShellFailure(say("Nothing was committed. %1%\nTo commit it under your own name, use "
+                               "--as-is.",
+                               describePickOfAnother()));
     }
 }
 
@@ -137,6 +183,10 @@ std::string describeUnfinished(CMAdapter &adapter)
 {
     std::string text = describeUnfinishedMerge(adapter);
     text = text.empty() ? describeOperation(adapter) : text;
+    if (text.empty() && isPickOfAnother(adapter))
+    {
+        return describePickOfAnother();
+    }
     const bool isNormal = git::BranchManager::create(adapter)->getRepositoryState() == "Normal";
     return text.empty() && !isNormal
                ? say("A commit is being picked or reverted. Conclude it with \"vclink-shell "

@@ -9,7 +9,8 @@ namespace vclink::shell
 {
 
 /// @throws ShellFailure during an operation with more than one commit, e.g. a rebase: a commit of
-/// the back end ends it, and drops the rest without a warning
+/// the back end ends it, and drops the rest without a warning; also while a commit of another
+/// author is being picked: the back end does not keep the author
 void refuseHalfWay(CMAdapter &adapter);
 
 /// Whether a merge is under way, with conflicts or without.

@@ -18,6 +18,9 @@ class ShellUnfinished : public ShellMergeFixture
   protected:
     ShellUnfinished()
     {
+        // The author of all commits.
+        repository_.git({"config", "user.name", "Test Author"});
+        repository_.git({"config", "user.email", "author@example.com"});
         makeBranch("other", {{"a", "theirs\n"}});
         repository_.git({"checkout", "--quiet", "other"});
         commitFiles({{"b", "theirs\n"}});
@@ -144,6 +147,46 @@ TEST_F(ShellUnfinished, OneCommitThatIsPickedCanBeCommitted)
     succeed({"commit", "-m", "Picked"});
     EXPECT_EQ(repository_.line({"log", "-1", "--format=%s"}), "Picked");
     EXPECT_EQ(state(), "Normal\n");
+}
+
+/// git keeps the author of a commit that is picked, the back end does not.
+TEST_F(ShellUnfinished, ACommitOfAnotherAuthorIsNotCommittedAsOnesOwn)
+{
+    repository_.git({"checkout", "--quiet", "other~2"});
+    repository_.git({"commit", "--quiet", "--amend", "--no-edit", "--author=Else <else@x.org>"});
+    repository_.git({"branch", "elses"});
+    repository_.git({"checkout", "--quiet", "main"});
+    begin({"cherry-pick", "elses"});
+    repository_.write("a", "solution\n");
+    succeed({"resolved", "a"});
+    const std::string advice =
+        "A commit of another author is being picked. Conclude it with \"git commit\", which keeps "
+        "the author, or\nundo it with \"git cherry-pick --abort\".";
+    EXPECT_EQ(refuse({"commit", "-m", "Picked"}),
+              "Nothing was committed. " + advice +
+                  "\nTo commit it under your own name, use --as-is.\n");
+    EXPECT_EQ(refuse({"switch", "other"}), "Nothing was switched. " + advice + '\n');
+    const GitRepository twin = makeTwin();
+    twin.git({"commit", "--quiet", "--no-edit"});
+    EXPECT_EQ(twin.line({"log", "-1", "--format=%an"}), "Else");
+    succeed({"commit", "--as-is", "-m", "Picked"});
+    EXPECT_NE(repository_.line({"log", "-1", "--format=%an"}), "Else");
+}
+
+/// git leaves out signs at the ends of a name when it writes a commit.
+TEST_F(ShellUnfinished, ACommitOfOnesOwnWithAnOddNameCanBeCommitted)
+{
+    repository_.git({"config", "user.name", " J. Jr., "});
+    repository_.git({"config", "author.name", "Ignored here"});
+    repository_.git({"checkout", "--quiet", "other~2"});
+    repository_.git(
+        {"-c", "author.name=", "commit", "--quiet", "--amend", "--no-edit", "--reset-author"});
+    repository_.git({"branch", "own"});
+    repository_.git({"checkout", "--quiet", "main"});
+    begin({"cherry-pick", "own"});
+    repository_.write("a", "solution\n");
+    succeed({"resolved", "a"});
+    succeed({"commit", "-m", "Picked"});
 }
 
 TEST_F(ShellUnfinished, TheLastOfASeriesCanBeCommitted)
