@@ -1,19 +1,17 @@
 // SPDX-License-Identifier: MIT
 #include "main/mergeState/MergeMarker.hpp"
 
-#include <array>
 #include <cerrno>
 #include <cstddef>
 
-#include <fcntl.h>
 #include <git2/oid.h>
 #include <git2/repository.h>
 #include <unistd.h>
 
 #include "error/errorUtil/raiseSystemError.hpp"
 #include "util/repository/objectIds.hpp"
-#include "util/scope/FileDescriptor.hpp"
 #include "util/scope/newFile.hpp"
+#include "util/scope/wholeFile.hpp"
 
 namespace vclink::git
 {
@@ -44,11 +42,8 @@ bool isIdLine(const std::string &line)
 /// Returns the id and the line end of such a file, empty if there is none.
 std::string readIdLine(const std::string &path)
 {
-    const FileDescriptor file(::open(path.c_str(), O_RDONLY | O_CLOEXEC));
-    std::string line(idLineSize, '\0');
-    const ssize_t size = file ? ::read(file.get(), line.data(), line.size()) : 0;
-    line.resize(size > 0 ? static_cast<std::size_t>(size) : 0);
-    return line;
+    std::string line;
+    return readWholeFile(path, line) == 0 ? line.substr(0, idLineSize) : std::string();
 }
 
 } // namespace
@@ -80,20 +75,18 @@ MergeMarker::~MergeMarker()
 bool hasMergeMarker(git_repository *repository, const git_oid &theirs)
 {
     const std::string path = markerPath(repository);
-    const FileDescriptor file(::open(path.c_str(), O_RDONLY | O_CLOEXEC));
-    if (!file && errno == ENOENT)
+    std::string text;
+    const int error = readWholeFile(path, text);
+    if (error == ENOENT)
     {
         return false;
     }
-    std::array<char, markerSize> text{};
-    const ssize_t size = file ? ::read(file.get(), text.data(), text.size()) : -1;
-    if (size < 0)
+    if (error != 0)
     {
-        raiseSystemError(errno, "could not read '" + path + "'");
+        raiseSystemError(error, "could not read '" + path + "'");
     }
-    const bool isWhole = static_cast<std::size_t>(size) == text.size();
-    const std::string line = std::string(text.data(), text.size()).substr(idLineSize);
-    return !isWhole || !isIdLine(line) || line == lineOf(theirs);
+    const std::string line = text.size() == markerSize ? text.substr(idLineSize) : std::string();
+    return !isIdLine(line) || line == lineOf(theirs);
 }
 
 void removeMergeMarker(git_repository *repository) noexcept

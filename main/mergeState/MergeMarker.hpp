@@ -35,8 +35,7 @@ class MergeMarker
 };
 
 /// Returns true if a merge of `theirs` was interrupted in this repository, with any HEAD: the rest
-/// of a merge survives a switch of the branch. An incomplete or damaged
-/// marker counts.
+/// of a merge survives a switch of the branch. An incomplete or damaged marker counts.
 /// @throws LibGit2Exception if this cannot be found out
 [[nodiscard]] bool hasMergeMarker(git_repository *repository, const git_oid &theirs);
 

@@ -2,13 +2,11 @@
 #include "main/mergeState/interruptedMerge.hpp"
 
 #include <algorithm>
-#include <array>
 #include <cerrno>
 #include <memory>
 #include <string>
 #include <vector>
 
-#include <fcntl.h>
 #include <git2/commit.h>
 #include <git2/diff.h>
 #include <git2/errors.h>
@@ -17,7 +15,6 @@
 #include <git2/repository.h>
 #include <git2/tree.h>
 #include <sys/stat.h>
-#include <unistd.h>
 
 #include "error/errorUtil/GitResult.hpp"
 #include "error/errorUtil/callbackException.hpp"
@@ -27,7 +24,7 @@
 #include "main/mergeState/MergeMarker.hpp"
 #include "util/repository/objectIds.hpp"
 #include "util/repository/repository.hpp"
-#include "util/scope/FileDescriptor.hpp"
+#include "util/scope/wholeFile.hpp"
 
 namespace vclink::git
 {
@@ -67,17 +64,17 @@ enum class MergeMode
 MergeMode readMergeMode(const std::string &path)
 {
     const std::string ofLibGit2 = "no-ff";
-    std::array<char, 16> text{};
-    const FileDescriptor file(::open(path.c_str(), O_RDONLY | O_CLOEXEC));
-    if (!file && errno == ENOENT)
+    std::string text;
+    const int error = readWholeFile(path, text);
+    if (error == ENOENT)
     {
         return MergeMode::None;
     }
-    if (!file || ::read(file.get(), text.data(), text.size() - 1) < 0)
+    if (error != 0)
     {
-        raiseSystemError(errno, "could not read '" + path + "'");
+        raiseSystemError(error, "could not read '" + path + "'");
     }
-    return text.data() == ofLibGit2 ? MergeMode::OfLibGit2 : MergeMode::OfGit;
+    return text == ofLibGit2 ? MergeMode::OfLibGit2 : MergeMode::OfGit;
 }
 
 OwnedHandle<git_tree> treeOf(const git_commit *commit)

@@ -1,25 +1,19 @@
 // SPDX-License-Identifier: MIT
 #include "main/mergeState/mergeHead.hpp"
 
-#include <array>
-#include <cerrno>
-#include <cstddef>
-#include <cstring>
 #include <string>
 
-#include <fcntl.h>
 #include <git2/commit.h>
 #include <git2/errors.h>
 #include <git2/oid.h>
 #include <git2/repository.h>
-#include <unistd.h>
 
 #include "error/errorUtil/raiseGitError.hpp"
 #include "error/errorUtil/raiseSystemError.hpp"
 #include "util/repository/objectIds.hpp"
 #include "util/repository/repository.hpp"
-#include "util/scope/FileDescriptor.hpp"
 #include "util/scope/newFile.hpp"
+#include "util/scope/wholeFile.hpp"
 
 namespace vclink::git
 {
@@ -59,22 +53,18 @@ void refuseCommitWithoutMergeHead(git_repository *repository, int state)
 void refuseDamagedMergeHead(git_repository *repository)
 {
     const std::string path = mergeHeadPath(repository);
-    const FileDescriptor file(::open(path.c_str(), O_RDONLY | O_CLOEXEC));
-    std::array<char, 4096> text{};
-    ssize_t size = -1;
-    while (file && (size = ::read(file.get(), text.data(), text.size())) > 0)
+    std::string text;
+    const int error = readWholeFile(path, text);
+    if (error != 0)
     {
-        if (std::memchr(text.data(), '\0', static_cast<std::size_t>(size)) != nullptr)
-        {
-            raiseGitError(GIT_ERROR, GIT_ERROR_MERGE,
-                          "MERGE_HEAD is damaged, and the commit would lack the history of the "
-                          "other side: write the id of the merged commit into '" +
-                              path + "', or abort the merge with 'git merge --abort'");
-        }
+        raiseSystemError(error, "could not read '" + path + "'");
     }
-    if (size < 0)
+    if (text.find('\0') != std::string::npos)
     {
-        raiseSystemError(errno, "could not read '" + path + "'");
+        raiseGitError(GIT_ERROR, GIT_ERROR_MERGE,
+                      "MERGE_HEAD is damaged, and the commit would lack the history of the other "
+                      "side: write the id of the merged commit into '" +
+                          path + "', or abort the merge with 'git merge --abort'");
     }
 }
 
