@@ -33,6 +33,7 @@
 #include "util/repository/objectIds.hpp"
 #include "util/repository/reflogAccess.hpp"
 #include "util/repository/repository.hpp"
+#include "util/repository/settings.hpp"
 #include "util/repository/workingTrees.hpp"
 
 namespace vclink::git
@@ -265,6 +266,7 @@ void BasicBranchManager::switchBranch(const BranchName &name)
     refuseCheckedOutElsewhere(repository.get(), branch.get());
     refuseSwitchInUnfinishedOperation(repository.get());
     refuseFatalPatterns(repository.get());
+    refuseUnreadableSettings(repository.get());
     const CheckoutOptions options = optionsFactory_->makeCheckoutOptions();
     git_checkout_options record = toGitCheckoutOptions(options, callbacks_->checkoutCallbacks());
     CheckoutWatch watch(CheckoutKind::Switch, repository.get(), record);

@@ -1,12 +1,15 @@
 // SPDX-License-Identifier: MIT
 #include "main/checkout/CloneWatch.hpp"
 
+#include <git2/remote.h>
 #include <git2/repository.h>
 
+#include "error/errorUtil/GitResult.hpp"
 #include "error/errorUtil/OwnedHandle.hpp"
 #include "error/errorUtil/callbackException.hpp"
 #include "main/checkout/NewAttributes.hpp"
 #include "util/repository/repository.hpp"
+#include "util/repository/settings.hpp"
 
 namespace vclink::git
 {
@@ -16,11 +19,12 @@ CloneWatch::CloneWatch(git_clone_options &record)
 {
     record.repository_cb = create;
     record.repository_cb_payload = this;
+    record.remote_cb = createRemote;
     record.checkout_opts.notify_cb = pass;
     record.checkout_opts.notify_payload = this;
 }
 
-/// As libgit2 does it. It gives the repository to no other callback.
+/// As libgit2 does it. It does not give the repository to the checkout's notification.
 int CloneWatch::create(git_repository **repository, const char *path, int isBare,
                        void *payload) noexcept
 {
@@ -34,6 +38,22 @@ int CloneWatch::create(git_repository **repository, const char *path, int isBare
         *repository = owned.release();
     }
     return code;
+}
+
+/// As libgit2 does it, which removes the repository if this fails.
+int CloneWatch::createRemote(git_remote **remote, git_repository *repository, const char *name,
+                             const char *url, void * /*payload*/) noexcept
+{
+    try
+    {
+        refuseUnreadableSettings(repository);
+        *remote = acquire<git_remote>(git_remote_create, repository, name, url).value().release();
+        return 0;
+    }
+    catch (...)
+    {
+        return parkCallbackException();
+    }
 }
 
 int CloneWatch::pass(git_checkout_notify_t why, const char *path, const git_diff_file *baseline,

@@ -28,6 +28,7 @@
 #include "util/lock/referenceLocks.hpp"
 #include "util/repository/fatalPatterns.hpp"
 #include "util/repository/repository.hpp"
+#include "util/repository/settings.hpp"
 
 namespace vclink::git
 {
@@ -88,6 +89,11 @@ GitResult<OwnedHandle<git_object>> lookUpWritten(git_repository *repository, con
 void GitAdapter::commit(const upath & /*folder*/, const ustring &message)
 {
     const OwnedHandle<git_repository> repository = openWorkingCopy(root_);
+    // A merge has looked at them before it began.
+    if (expectedMerge_ == nullptr)
+    {
+        refuseUnreadableSettings(repository.get());
+    }
     // From here no other process commits, merges or ends a merge in this working copy.
     IndexLock lock = lockIndex(repository.get(), expectedMerge_ != nullptr);
     // If HEAD has no commit, for any reason, the new commit is a root commit.

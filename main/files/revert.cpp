@@ -26,6 +26,7 @@
 #include "util/path/PathspecArray.hpp"
 #include "util/path/paths.hpp"
 #include "util/repository/repository.hpp"
+#include "util/repository/settings.hpp"
 #include "vclink/git/messageIdentifiers.hpp"
 #include "vclink/util/generateFileReport.hpp"
 
@@ -161,6 +162,7 @@ void GitAdapter::revertFiles(const std::vector<upath> &files)
     }
     const PathspecArray pathspec = makeFilePathspec(files, root_);
     const OwnedHandle<git_repository> repository = openWorkingCopy(root_);
+    refuseUnreadableSettings(repository.get());
     IndexLock lock(repository.get());
     // Without a HEAD the reset removes the paths from the index.
     const GitResult<OwnedHandle<git_object>> head = revparseObject(repository.get(), "HEAD");

@@ -15,6 +15,7 @@
 #include "util/path/PathspecArray.hpp"
 #include "util/repository/fatalPatterns.hpp"
 #include "util/repository/repository.hpp"
+#include "util/repository/settings.hpp"
 #include "vclink/git/messageIdentifiers.hpp"
 #include "vclink/util/generateFileReport.hpp"
 
@@ -101,6 +102,7 @@ void GitAdapter::addToIndex(const std::vector<upath> &files)
     }
     refuseNuls(files);
     const OwnedHandle<git_repository> repository = openWorkingCopy(root_);
+    refuseUnreadableSettings(repository.get());
     IndexLock lock(repository.get());
     const OwnedHandle<git_index> index = getRepositoryIndex(repository.get());
     refuseFatalPatternsInFolders(repository.get(), index.get());

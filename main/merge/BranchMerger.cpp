@@ -28,6 +28,7 @@
 #include "util/repository/fatalPatterns.hpp"
 #include "util/repository/reflogAccess.hpp"
 #include "util/repository/repository.hpp"
+#include "util/repository/settings.hpp"
 #include "vclink/git/messageIdentifiers.hpp"
 
 namespace vclink::git
@@ -92,6 +93,7 @@ void BranchMerger::decide(const BranchName &name, git_repository *repository)
 {
     refuseOtherStates(repository);
     refuseFatalPatterns(repository);
+    refuseUnreadableSettings(repository);
     const git_oid *const id = revparseId(name, repository);
     const OwnedHandle<git_annotated_commit> theirs =
         acquire<git_annotated_commit>(git_annotated_commit_lookup, repository, id).value();

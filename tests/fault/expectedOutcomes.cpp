@@ -224,6 +224,8 @@ std::vector<Tolerance> tolerancesOfOthers(const std::string &operation, const st
     return {
         // Only a missing folder is no failure of a probe.
         {"isAdapterFor", "git_repository_open_ext", any, GIT_ENOTFOUND, "done: 0"},
+        // A setting need not be there.
+        {"", "git_config_get_mapped", any, GIT_ENOTFOUND, normal},
         // Any answer but no means that the file is listed.
         {"", "git_pathspec_matches_path", any, any, normal},
         // Without a HEAD the files are taken out of the index.

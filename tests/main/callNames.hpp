@@ -16,6 +16,11 @@ inline const CallNames ofTheQuery{"git_status_options_init", "git_repository_ope
                                   "git_repository_index",    "git_index_free",
                                   "git_status_foreach_ext",  "git_repository_free"};
 
+/// The calls of the look at settings, before an operation that converts files changes anything.
+inline const CallNames ofTheSettings{"git_repository_config", "git_config_get_mapped",
+                                     "git_config_get_mapped", "git_config_get_mapped",
+                                     "git_config_free"};
+
 inline CallNames operator+(CallNames left, const CallNames &right)
 {
     left.insert(left.end(), right.begin(), right.end());

@@ -16,6 +16,7 @@
 
 #include "BranchCallsFixture.hpp"
 #include "error/logging/severity.hpp"
+#include "main/callNames.hpp"
 #include "support/LogCapture.hpp"
 #include "support/libgit2/LibGit2Recorder.hpp"
 #include "support/libgit2Release.hpp"
@@ -145,19 +146,20 @@ TEST_F(CallsOnBranches, OfASwitchAreTheseInOrderWithTheRecordOfASafeCheckout)
     LibGit2Recorder calls;
     collectRecords(calls);
     branches().switchBranch("topic");
-    EXPECT_EQ(
-        calls.steps(),
-        joined({{"git_repository_open_ext", "git_index_open", "git_repository_set_index",
-                 "git_index_set_caps", "git_index_free", "git_branch_lookup",
-                 "git_reference_name_to_id", "git_revparse_single", "git_reference_peel",
-                 "git_object_peel", "git_object_free", "git_object_free",
-                 "git_branch_is_checked_out", "git_repository_state", "git_checkout_options_init"},
-                lookBeforeASwitch_,
-                {"git_transaction_new", "git_transaction_lock_ref", "git_transaction_free",
-                 "git_reference_name_to_id", "git_checkout_tree", "git_reference_name_to_id",
-                 "git_repository_set_head"},
-                endOfTheLook_,
-                {"git_object_free", "git_reference_free", "git_repository_free"}}));
+    EXPECT_EQ(calls.steps(),
+              joined({{"git_repository_open_ext", "git_index_open", "git_repository_set_index",
+                       "git_index_set_caps", "git_index_free", "git_branch_lookup",
+                       "git_reference_name_to_id", "git_revparse_single", "git_reference_peel",
+                       "git_object_peel", "git_object_free", "git_object_free",
+                       "git_branch_is_checked_out", "git_repository_state"},
+                      ofTheSettings,
+                      {"git_checkout_options_init"},
+                      lookBeforeASwitch_,
+                      {"git_transaction_new", "git_transaction_lock_ref", "git_transaction_free",
+                       "git_reference_name_to_id", "git_checkout_tree", "git_reference_name_to_id",
+                       "git_repository_set_head"},
+                      endOfTheLook_,
+                      {"git_object_free", "git_reference_free", "git_repository_free"}}));
     ASSERT_THAT(checkouts_, SizeIs(1));
     expectCheckoutRecord(checkouts_[0], libgit2_release::safeCheckout);
     EXPECT_THAT(checkoutPaths_[0], IsEmpty());
@@ -199,12 +201,13 @@ TEST_F(CallsOfAMerge, OfAFastForwardAreTheseInOrder)
         { EXPECT_EQ(message, nullptr) << "and nothing for the reflog"; });
     merge("topic");
     EXPECT_EQ(calls.steps(),
-              joined({{"git_repository_open_ext", "git_repository_state", "git_revparse_single",
-                       "git_oid_cpy", "git_object_free", "git_annotated_commit_lookup",
-                       "git_merge_analysis", "git_index_open", "git_repository_set_index",
-                       "git_index_set_caps", "git_index_free", "git_repository_state",
-                       "git_repository_head", "git_graph_descendant_of", "git_object_lookup",
-                       "git_checkout_options_init"},
+              joined({{"git_repository_open_ext", "git_repository_state"},
+                      ofTheSettings,
+                      {"git_revparse_single", "git_oid_cpy", "git_object_free",
+                       "git_annotated_commit_lookup", "git_merge_analysis", "git_index_open",
+                       "git_repository_set_index", "git_index_set_caps", "git_index_free",
+                       "git_repository_state", "git_repository_head", "git_graph_descendant_of",
+                       "git_object_lookup", "git_checkout_options_init"},
                       lookBeforeASwitch_,
                       {"git_transaction_new", "git_transaction_lock_ref", "git_transaction_free",
                        "git_repository_head", "git_reference_free", "git_checkout_tree",
@@ -221,10 +224,11 @@ TEST_F(CallsOfAMerge, OfAMergeThatIsUpToDateStopAtTheAnalysis)
 {
     LibGit2Recorder calls;
     merge("main");
-    EXPECT_THAT(calls.steps(), ElementsAre("git_repository_open_ext", "git_repository_state",
-                                           "git_revparse_single", "git_oid_cpy", "git_object_free",
-                                           "git_annotated_commit_lookup", "git_merge_analysis",
-                                           "git_annotated_commit_free", "git_repository_free"));
+    EXPECT_EQ(calls.steps(), joined({{"git_repository_open_ext", "git_repository_state"},
+                                     ofTheSettings,
+                                     {"git_revparse_single", "git_oid_cpy", "git_object_free",
+                                      "git_annotated_commit_lookup", "git_merge_analysis",
+                                      "git_annotated_commit_free", "git_repository_free"}}));
 }
 
 TEST_F(CallsOfAMerge, OfAMergeThatFailsReleaseAllBeforeTheExceptionIsMade)
@@ -283,11 +287,12 @@ TEST_F(CallsOfAMerge, OfACleanMergeAreTheseInOrder)
     collectRecords(calls);
     merge("topic");
     const Calls expected =
-        joined({{"git_repository_open_ext", "git_repository_state", "git_revparse_single",
-                 "git_oid_cpy", "git_object_free", "git_annotated_commit_lookup",
-                 "git_merge_analysis", "git_checkout_options_init", "git_merge_options_init",
-                 "git_index_open", "git_repository_set_index", "git_index_set_caps",
-                 "git_index_free", "git_repository_state"},
+        joined({{"git_repository_open_ext", "git_repository_state"},
+                ofTheSettings,
+                {"git_revparse_single", "git_oid_cpy", "git_object_free",
+                 "git_annotated_commit_lookup", "git_merge_analysis", "git_checkout_options_init",
+                 "git_merge_options_init", "git_index_open", "git_repository_set_index",
+                 "git_index_set_caps", "git_index_free", "git_repository_state"},
                 lookBeforeAMerge_,
                 {"git_repository_head", "git_transaction_new", "git_transaction_lock_ref",
                  "git_transaction_free", "git_reference_free", "git_reference_name_to_id",

@@ -50,8 +50,9 @@ TEST_F(RefreshOfACommit, ComesAfterWhatChangedIsStagedByItsPath)
     startNoting();
     commitOnce();
     const auto steps = calls_->steps();
-    ASSERT_GE(steps.size(), 20U);
-    EXPECT_THAT(std::vector<std::string>(steps.begin() + 10, steps.begin() + 20),
+    const auto begin = std::find(steps.begin(), steps.end(), "git_repository_index");
+    ASSERT_GE(steps.end() - begin, 10);
+    EXPECT_THAT(std::vector<std::string>(begin, begin + 10),
                 ElementsAre("git_repository_index", "git_index_caps", "git_index_caps",
                             "git_diff_options_init", "git_diff_index_to_workdir",
                             "git_index_remove_bypath", "git_index_add_bypath", "git_diff_free",
@@ -141,8 +142,9 @@ TEST_F(RefreshOfACommit, ReadsTheIndexFileAgainBeforeItIsWritten)
     const auto lookUps = std::remove(steps.begin(), steps.end(), "git_index_find");
     EXPECT_EQ(steps.end() - lookUps, 3) << "once for each entry that was there";
     steps.erase(lookUps, steps.end());
-    ASSERT_GE(steps.size(), 15U);
-    EXPECT_THAT(std::vector<std::string>(steps.begin() + 10, steps.begin() + 15),
+    const auto begin = std::find(steps.begin(), steps.end(), "git_repository_index");
+    ASSERT_GE(steps.end() - begin, 5);
+    EXPECT_THAT(std::vector<std::string>(begin, begin + 5),
                 ElementsAre("git_repository_index", "git_index_update_all", "git_index_open",
                             "git_index_free", "git_index_write"));
 }

@@ -28,11 +28,10 @@ using namespace vclink::test;
 using Names = std::vector<std::string>;
 
 /// The index is read before, to be sure of it, and asked whether case matters.
-const Names ofTheReset =
-    ofTheQuery + Names{"git_repository_open_ext", "git_index_open", "git_repository_set_index",
-                       "git_index_set_caps",      "git_index_free", "git_revparse_single",
-                       "git_repository_index",    "git_index_caps", "git_index_has_conflicts",
-                       "git_reset_default"};
+const Names ofTheReset = ofTheQuery + Names{"git_repository_open_ext"} + ofTheSettings +
+                         Names{"git_index_open", "git_repository_set_index", "git_index_set_caps",
+                               "git_index_free", "git_revparse_single",      "git_repository_index",
+                               "git_index_caps", "git_index_has_conflicts",  "git_reset_default"};
 const Names ofTheOptions{"makeCheckoutOptions", "git_checkout_options_init"};
 const Names ofTheCheckout{"git_checkout_index"};
 const Names ofTheRelease{"git_index_free", "git_object_free", "git_repository_free"};

@@ -24,15 +24,16 @@ using namespace vclink::test;
 using Names = std::vector<std::string>;
 
 const Names ofTheOpening{"git_repository_open_ext"};
-const Names ofTheLock = ofTheOpening + Names{"git_index_open", "git_repository_set_index",
-                                             "git_index_set_caps", "git_index_free"};
+const Names ofTheLock{"git_index_open", "git_repository_set_index", "git_index_set_caps",
+                      "git_index_free"};
+const Names beforeTheAddition = ofTheOpening + ofTheSettings + ofTheLock;
 const Names ofTheEnd{"git_index_free", "git_repository_free"};
 /// The second call asks whether case matters.
 const Names ofTheIndex{"git_repository_index", "git_index_caps"};
 const Names ofTheAddition =
-    ofTheLock + ofTheIndex + Names{"git_index_add_all", "git_index_write"} + ofTheEnd;
-const Names ofTheRemoval =
-    ofTheLock + ofTheIndex + Names{"git_index_remove_all", "git_index_write"} + ofTheEnd;
+    beforeTheAddition + ofTheIndex + Names{"git_index_add_all", "git_index_write"} + ofTheEnd;
+const Names ofTheRemoval = ofTheOpening + ofTheLock + ofTheIndex +
+                           Names{"git_index_remove_all", "git_index_write"} + ofTheEnd;
 
 /// What an index call was given.
 struct AskedOfIndex
@@ -110,7 +111,8 @@ TEST_F(StagingCalls, OfAnAdditionHoldWhatElseHasChanged)
     const Names prepare{"git_pathspec_new", "git_index_caps", "git_pathspec_matches_path",
                         "git_pathspec_matches_path", "git_pathspec_free"};
     const Names addition{"git_index_add_all", "git_index_write"};
-    EXPECT_EQ(calls_.steps(), ofTheQuery + ofTheLock + ofTheIndex + prepare + addition + ofTheEnd);
+    EXPECT_EQ(calls_.steps(),
+              ofTheQuery + beforeTheAddition + ofTheIndex + prepare + addition + ofTheEnd);
     EXPECT_THAT(calls_.openHandles(), IsEmpty());
     EXPECT_THAT(held, ElementsAre(GIT_INDEX_ENTRY_VALID, GIT_INDEX_ENTRY_VALID, 0U));
     auto after = indexOf(repository_);

@@ -1,9 +1,11 @@
 // SPDX-License-Identifier: MIT
 #include "main/checkout/CloneWatch.hpp"
 
+#include <filesystem>
 #include <string>
 #include <vector>
 
+#include <git2/errors.h>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
@@ -55,6 +57,24 @@ TEST_P(CloneAttributes, ThatAreALinkApplyToNothing)
     author_.symlink("a", "s/.gitattributes");
     addsFiles_(author_);
     publish("other", "x");
+    expectClonedAsByGit();
+}
+
+/// libgit2 would convert the binary file. git takes the value for unset.
+TEST_P(CloneAttributes, AreNotIgnoredForASettingThatCannotBeRead)
+{
+    author_.write(".gitattributes", "*.bin binary\n");
+    publish("p.bin", "a\nb\r\n");
+    repository_.git({"config", "--global", "core.eol", "auto"});
+    const Failure failure = failureOf([this] { generate(); });
+    EXPECT_EQ(failure.code, GIT_ERROR);
+    EXPECT_EQ(failure.errorClass, GIT_ERROR_CONFIG);
+    EXPECT_THAT(failure.text, testing::HasSubstr("core.eol is 'auto'"));
+    EXPECT_FALSE(std::filesystem::exists(clone_.path()));
+    clone_.makeFolder("");
+    failureOf([this] { generate(); });
+    EXPECT_TRUE(std::filesystem::is_empty(clone_.path()));
+    repository_.git({"config", "--global", "core.eol", "native"});
     expectClonedAsByGit();
 }
 

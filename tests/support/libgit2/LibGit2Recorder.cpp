@@ -77,7 +77,10 @@ void Passing::giveOut(const void *handle) const
 void Passing::takeBackFromCallbacks() const
 {
     if (std::string_view(function_) == "git_clone")
+    {
         recorder_->forgetHandlesOf("git_repository_init");
+        recorder_->forgetHandlesOf("git_remote_create");
+    }
 }
 
 void Passing::setError()
