@@ -26,12 +26,12 @@ std::string readLine(const fs::path &path)
     return line;
 }
 
-/// What HEAD names: a symbolic link does with core.preferSymlinkRefs.
-std::string readHead(const fs::path &state)
+/// What HEAD or a branch names: a symbolic link does with core.preferSymlinkRefs.
+std::string readReference(const fs::path &path)
 {
     std::error_code noLink;
-    const std::string link = fs::read_symlink(state / "HEAD", noLink).string();
-    return link.rfind("refs/", 0) == 0 ? link : readLine(state / "HEAD");
+    const std::string link = fs::read_symlink(path, noLink).string();
+    return link.rfind("refs/", 0) == 0 ? link : readLine(path);
 }
 
 /// The NAME of "ref: refs/heads/NAME", or of "refs/heads/NAME" as a rebase keeps it.
@@ -67,11 +67,25 @@ void takeMoved(const State &state, std::vector<CheckedOutBranch> &branches)
     }
 }
 
-void take(const State &state, std::vector<CheckedOutBranch> &branches)
+/// The branch that HEAD names and, if that is a symbolic reference, those that it leads to.
+void takeCurrent(const State &state, const fs::path &shared,
+                 std::vector<CheckedOutBranch> &branches)
 {
-    for (const std::string &line :
-         {readHead(state.folder), readLine(state.folder / "rebase-merge/head-name"),
-          readLine(state.folder / "rebase-apply/head-name")})
+    // git follows no more.
+    constexpr int longestChain = 5;
+    std::string name = shortName(readReference(state.folder / "HEAD"));
+    for (int step = 0; !name.empty() && step < longestChain; ++step)
+    {
+        branches.push_back({name, state.root, state.isOwn, false});
+        name = shortName(readReference(shared / "refs/heads" / name));
+    }
+}
+
+void take(const State &state, const fs::path &shared, std::vector<CheckedOutBranch> &branches)
+{
+    takeCurrent(state, shared, branches);
+    for (const std::string &line : {readLine(state.folder / "rebase-merge/head-name"),
+                                    readLine(state.folder / "rebase-apply/head-name")})
     {
         const std::string name = shortName(line);
         if (!name.empty())
@@ -134,7 +148,7 @@ std::vector<CheckedOutBranch> findCheckedOutBranches(const fs::path &root)
     {
         state.isOwn = state.folder == own;
         state.root = state.isOwn ? root : state.root;
-        take(state, branches);
+        take(state, shared, branches);
     }
     return branches;
 }

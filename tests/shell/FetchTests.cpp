@@ -182,6 +182,20 @@ TEST_F(ShellFetch, MovesNoBranchThatIsCheckedOut)
               references(served_).at("refs/heads/main"));
 }
 
+/// As git.
+TEST_F(ShellFetch, MovesNoBranchThatIsCheckedOutUnderAnotherName)
+{
+    repository_.git({"symbolic-ref", "refs/heads/alias", "refs/heads/main"});
+    repository_.git({"symbolic-ref", "HEAD", "refs/heads/alias"});
+    EXPECT_NE(repository_.tryGit({"fetch", "origin", "main:main"}).exitStatus, 0);
+    for (const std::string name : {"main", "alias"})
+    {
+        EXPECT_THAT(refuse({"fetch", "origin", "refs/heads/main:" + name}),
+                    StartsWith("Nothing was fetched: that would move the branch '" + name +
+                               "', which is checked out in the working copy"));
+    }
+}
+
 /// As git, from each working copy.
 TEST_F(ShellFetch, MovesNoBranchThatIsCheckedOutWhereverItsRepositoryIs)
 {

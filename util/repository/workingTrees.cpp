@@ -13,6 +13,7 @@
 #include <git2/config.h>
 #include <git2/errors.h>
 #include <git2/repository.h>
+#include <sys/stat.h>
 #include <unistd.h>
 
 #include "error/errorUtil/GitResult.hpp"
@@ -75,6 +76,40 @@ std::string linkIn(const std::string &path)
         raiseUnreadState(path, errno);
     }
     return size < 0 ? std::string() : std::string(text.data(), static_cast<std::size_t>(size));
+}
+
+/// Returns the reference that a symbolic link names, which git makes for core.preferSymlinkRefs;
+/// empty for everything else.
+std::string linkedReference(const std::string &path)
+{
+    // With another link in the place of HEAD git finds no repository.
+    const std::string link = linkIn(path);
+    return link.rfind("refs/", 0) == 0 ? link : std::string();
+}
+
+bool isRegularFile(const std::string &path)
+{
+    struct stat status = {};
+    return ::stat(path.c_str(), &status) == 0 && S_ISREG(status.st_mode);
+}
+
+/// Returns the reference that another one names; empty if it names a commit or does not exist.
+std::string symbolicTarget(const std::string &path)
+{
+    const std::string link = linkedReference(path);
+    // A folder has branches whose names begin so.
+    return link.empty() && isRegularFile(path) ? referenceIn(firstLineOf(path)) : link;
+}
+
+/// Returns the folder with the branches of a working tree.
+std::string folderOfBranches(const std::string &state)
+{
+    const std::string shared = firstLineOf(state + "commondir");
+    if (shared.empty())
+    {
+        return state;
+    }
+    return (shared.front() == '/' ? shared : state + shared) + '/';
 }
 
 [[noreturn]] void raiseLinkedHead(const std::string &action, const std::string &reference)
@@ -149,15 +184,20 @@ WorkingTree::WorkingTree(std::string state, bool isBare) : state_(std::move(stat
 
 bool WorkingTree::isOn(const std::string &branch) const
 {
+    // git follows no more.
+    constexpr int longestChain = 5;
     const std::string link = linkedHead();
-    return (link.empty() ? referenceIn(firstLineOf(state_ + "HEAD")) : link) == branch;
+    std::string name = link.empty() ? referenceIn(firstLineOf(state_ + "HEAD")) : link;
+    for (int step = 1; name != branch && !name.empty() && step < longestChain; ++step)
+    {
+        name = symbolicTarget(folderOfBranches(state_) + name);
+    }
+    return name == branch;
 }
 
 std::string WorkingTree::linkedHead() const
 {
-    // With another link git finds no repository.
-    const std::string link = linkIn(state_ + "HEAD");
-    return link.rfind("refs/", 0) == 0 ? link : std::string();
+    return linkedReference(state_ + "HEAD");
 }
 
 bool WorkingTree::hasCheckedOut(const std::string &branch) const

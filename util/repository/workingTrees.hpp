@@ -20,7 +20,8 @@ class WorkingTree
     /// @param isBare of the repository, which has a HEAD and no working tree then
     explicit WorkingTree(std::string state, bool isBare = false);
 
-    /// Returns true if HEAD names the branch. That of a bare repository does as well.
+    /// Returns true if HEAD names the branch, also through branches that are symbolic references.
+    /// That of a bare repository does as well.
     bool isOn(const std::string &branch) const;
     /// Returns the reference that HEAD names as a symbolic link, which git makes for
     /// core.preferSymlinkRefs; empty if HEAD is a file. libgit2 follows the link: it takes HEAD for

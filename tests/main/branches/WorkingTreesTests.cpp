@@ -112,6 +112,25 @@ const TreeCase treeCases[] = {
      "git -c user.name=x -c user.email=x@y commit -q --allow-empty -m top; "
      "GIT_SEQUENCE_EDITOR='sed -i 1s/^pick/edit/' git rebase -q -i --update-refs HEAD~2",
      false, true},
+    {"ThatHasItUnderAnotherName",
+     "git symbolic-ref refs/heads/alias refs/heads/topic; git worktree add -q --detach ../other; "
+     "git -C ../other symbolic-ref HEAD refs/heads/alias",
+     true, true},
+    {"ThatHasItThroughSeveralNames",
+     "git symbolic-ref refs/heads/c refs/heads/topic; "
+     "git -c core.preferSymlinkRefs=true symbolic-ref refs/heads/b refs/heads/c; "
+     "git symbolic-ref refs/heads/a refs/heads/b; git worktree add -q --detach ../other; "
+     "git -C ../other symbolic-ref HEAD refs/heads/a",
+     true, true},
+    {"ThatIsTheMainOneUnderAnotherName",
+     "git symbolic-ref refs/heads/alias refs/heads/topic; "
+     "git symbolic-ref HEAD refs/heads/alias; git reset -q --hard; "
+     "git worktree add -q -b linked ../other main",
+     true, true, "../other"},
+    {"WhoseBranchHasTheNameOfAFolder",
+     "git branch dir/inside; git worktree add -q --detach ../other; "
+     "git -C ../other symbolic-ref HEAD refs/heads/dir",
+     false, false},
     {"ThatIsTheMainOne", "git switch -q topic; git worktree add -q -b linked ../other main", true,
      true, "../other"},
     {"ThatIsTheMainOneAndAway",
@@ -125,6 +144,25 @@ const TreeCase treeCases[] = {
 
 INSTANTIATE_TEST_SUITE_P(It, OtherWorkingTree, testing::ValuesIn(treeCases),
                          [](const auto &row) { return row.param.sentence; });
+
+/// Its next commit would have no parents.
+TEST_F(OtherWorkingTree, KeepsTheOtherNameOfItsBranchToo)
+{
+    runScript(repository_, "git symbolic-ref refs/heads/alias refs/heads/topic; "
+                           "git worktree add -q --detach ../other; "
+                           "git -C ../other symbolic-ref HEAD refs/heads/alias");
+    EXPECT_TRUE(isRefused([this] { branches().deleteBranch("alias"); }));
+    EXPECT_EQ(repository_.line({"symbolic-ref", "refs/heads/alias"}), "refs/heads/topic");
+}
+
+TEST_F(OtherWorkingTree, IsThisOneUnderAnotherName)
+{
+    runScript(repository_, "git symbolic-ref refs/heads/alias refs/heads/topic; "
+                           "git symbolic-ref HEAD refs/heads/alias; git reset -q --hard");
+    for (const std::string name : {"alias", "topic"})
+        EXPECT_TRUE(isRefused([&] { branches().deleteBranch(name); })) << name;
+    EXPECT_EQ(repository_.line({"rev-parse", "HEAD"}), repository_.line({"rev-parse", "topic"}));
+}
 
 /// As with git: a bare repository has a HEAD, and no files.
 TEST_F(OtherWorkingTree, IsNoBareRepository)

@@ -146,6 +146,9 @@ TEST_P(PushObstacles, KeepBranchesThatAreCheckedOutInLinkedTrees)
     expectAsGitDoes({":refs/heads/side"}, words);
     expectAsGitDoes({"refs/heads/main:refs/heads/main"}, "");
     expectAsGitDoes({"refs/heads/same:refs/heads/side"}, "");
+    server_.git({"symbolic-ref", "refs/heads/alias", "refs/heads/side"});
+    GitRepository(linked).git({"symbolic-ref", "HEAD", "refs/heads/alias"});
+    expectAsGitDoes(move, words);
     std::filesystem::remove_all(linked);
     expectAsGitDoes(move, words);
     server_.git({"config", "receive.denyCurrentBranch", "ignore"});
