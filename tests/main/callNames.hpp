@@ -19,7 +19,7 @@ inline const CallNames ofTheQuery{"git_status_options_init", "git_repository_ope
 /// The calls of the look at settings, before an operation that converts files changes anything.
 inline const CallNames ofTheSettings{"git_repository_config", "git_config_get_mapped",
                                      "git_config_get_mapped", "git_config_get_mapped",
-                                     "git_config_free"};
+                                     "git_config_get_mapped", "git_config_free"};
 
 inline CallNames operator+(CallNames left, const CallNames &right)
 {

@@ -34,10 +34,11 @@ constexpr git_configmap word(const char *text)
     return {GIT_CONFIGMAP_STRING, text, 0};
 }
 
-constexpr std::array<Setting, 3> mappedSettings{{
+constexpr std::array<Setting, 4> mappedSettings{{
     {"core.autocrlf", {falseValue, trueValue, word("input")}, 3, "true, false or input"},
     {"core.safecrlf", {falseValue, trueValue, word("warn")}, 3, "true, false or warn"},
     {"core.eol", {falseValue, word("lf"), word("crlf"), word("native")}, 4, "lf, crlf or native"},
+    {"core.logAllRefUpdates", {falseValue, trueValue, word("always")}, 3, "true, false or always"},
 }};
 
 /// Returns an empty text for a setting without a value.

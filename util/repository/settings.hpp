@@ -10,8 +10,10 @@ namespace vclink::git
 /// @throws LibGit2Exception if it has another value
 bool isSet(git_config *config, const char *setting);
 
-/// Refuses values of `core.autocrlf`, `core.safecrlf` and `core.eol` that libgit2 cannot read. With
-/// them it would convert the line ends of every file, also of binary ones. git_config_get_mapped.
+/// Refuses values of `core.autocrlf`, `core.safecrlf`, `core.eol` and `core.logAllRefUpdates` that
+/// libgit2 cannot read. With the first three it would convert the line ends of every file, also of
+/// binary ones; with the last one it fails to move HEAD, after the files have been written.
+/// git_config_get_mapped.
 /// @throws LibGit2Exception that names the setting and its value
 void refuseUnreadableSettings(git_repository *repository);
 

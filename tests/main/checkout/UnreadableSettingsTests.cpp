@@ -36,7 +36,7 @@ void PrintTo(const SettingCase &row, std::ostream *stream)
 
 const std::string binaryText("a\0\nb\r\n", 6);
 
-/// Settings with which libgit2 would convert binary files, too.
+/// Settings with which libgit2 would convert binary files, too, or fail halfway.
 class UnreadableSettings : public MergeFixture, public testing::WithParamInterface<SettingCase>
 {
   protected:
@@ -61,7 +61,7 @@ class UnreadableSettings : public MergeFixture, public testing::WithParamInterfa
         repository_.write(".git/config", config_);
     }
     static std::vector<upath> namesIn(const GitRepository &repository,
-                                              const std::vector<std::string> &names)
+                                      const std::vector<std::string> &names)
     {
         std::vector<upath> paths;
         for (const std::string &name : names)
@@ -138,6 +138,9 @@ const SettingCase unreadable[] = {
     {"EolWithoutValue", "eol", "core.eol is ''"},
     {"Autocrlf", "autocrlf = yess", "set it to true, false or input", true},
     {"Safecrlf", "safecrlf = fail", "set it to true, false or warn", true},
+    {"LogAllRefUpdates", "logAllRefUpdates = bogus",
+     "core.logAllRefUpdates is 'bogus', which libgit2 cannot read: set it to true, false or always",
+     true},
 };
 
 INSTANTIATE_TEST_SUITE_P(With, UnreadableSettings, testing::ValuesIn(unreadable),
@@ -166,10 +169,15 @@ TEST_P(ReadableSettings, StopNothing)
 }
 
 const SettingCase readable[] = {
-    {"NoEol", "eol = false"},           {"UpperCaseEol", "eol = CRLF"},
-    {"NativeEol", "eol = native"},      {"AutocrlfWithoutValue", "autocrlf"},
-    {"AutocrlfNumber", "autocrlf = 0"}, {"InputAutocrlf", "autocrlf = input"},
+    {"NoEol", "eol = false"},
+    {"UpperCaseEol", "eol = CRLF"},
+    {"NativeEol", "eol = native"},
+    {"AutocrlfWithoutValue", "autocrlf"},
+    {"AutocrlfNumber", "autocrlf = 0"},
+    {"InputAutocrlf", "autocrlf = input"},
     {"Warning", "safecrlf = warn"},
+    {"NoReflogs", "logAllRefUpdates = false"},
+    {"AllReflogs", "logAllRefUpdates = always"},
 };
 
 INSTANTIATE_TEST_SUITE_P(With, ReadableSettings, testing::ValuesIn(readable),
