@@ -34,8 +34,17 @@ bool takeFront(std::string_view &text, std::string_view beginning)
     return begins;
 }
 
+bool hasPassword(std::string_view address)
+{
+    std::string_view user = splitAt(address, "://").value_or("");
+    user = user.substr(0, user.find('/'));
+    user = user.substr(0, user.find_last_of('@') + 1);
+    return user.find(':') != std::string_view::npos;
+}
+
 void noteCredentials(RemoteNotes &notes, std::string_view request)
 {
+    notes.hasPassword = hasPassword(request.substr(0, request.rfind(" username_from_url=")));
     // An address can contain anything; the number is at the end.
     const std::size_t digits = request.find_last_of('=') + 1;
     unsigned kinds = 0;

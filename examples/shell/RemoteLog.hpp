@@ -25,6 +25,8 @@ struct RemoteNotes
     /// the kinds of credentials that the server asked for last, as libgit2's bits; nothing when it
     /// asked for none
     std::optional<unsigned> credentials;
+    /// whether the address for which it asked has a password
+    bool hasPassword = false;
     /// how many references of the working copy changed
     unsigned updated = 0;
     std::vector<PushedReference> pushed;

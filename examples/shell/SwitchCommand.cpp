@@ -28,13 +28,24 @@ namespace
 {
 
 /// The back end takes the files of a tag that has the branch's name, and the name of the branch.
+/// The same goes for HEAD, FETCH_HEAD and the like, the stash, and an id.
 /// @throws ShellFailure where that makes a difference
 void refuseOtherFiles(const git::BranchManager &manager, const std::string &name)
 {
     const std::optional<std::string> branch =
         findRevision(manager, "refs/heads/" + name + "^{tree}");
-    if (branch && findRevision(manager, name + "^{tree}") != branch)
+    const std::optional<std::string> found = findRevision(manager, name + "^{tree}");
+    if (branch && found != branch)
     {
+        const bool isTag = findRevision(manager, "refs/tags/" + name) &&
+                           findRevision(manager, "refs/tags/" + name + "^{tree}") == found;
+        if (!isTag)
+        {
+            throw ShellFailure(
+                say("Nothing was switched: '%1%' also means something else here, and its files "
+                    "would be written instead of the\nbranch's. Use \"%2%\", or rename the branch.",
+                    showName(name), "git switch " + quoteForShell(name)));
+        }
         throw ShellFailure(
             say("Nothing was switched: there is also a tag %1%, and its files would be written "
                 "instead of the\nbranch's. Rename the tag or the branch first.",

@@ -65,8 +65,13 @@ std::string explainKey(const git::GitError &failure)
 
 } // namespace
 
-std::string explainRefusedAccess(const git::GitError &failure, unsigned credentials)
+std::string explainRefusedAccess(const git::GitError &failure, const RemoteNotes &notes)
 {
+    if (!notes.credentials)
+    {
+        return "";
+    }
+    const unsigned credentials = *notes.credentials;
     if ((credentials & sshKey) != 0)
     {
         return explainKey(failure);
@@ -75,6 +80,10 @@ std::string explainRefusedAccess(const git::GitError &failure, unsigned credenti
     {
         return say("The server asked for a user name: put it before the host, as in "
                    "ssh://NAME@HOST/PATH.");
+    }
+    if (notes.hasPassword)
+    {
+        return say("The server rejects the user name or the password in the address.");
     }
     return say("The server asked for a password. This program never sends one; it only uses the "
                "keys of an ssh agent.");

@@ -3,6 +3,7 @@
 
 #include <string>
 
+#include "RemoteLog.hpp"
 #include "vclink/git/GitError.hpp"
 
 namespace vclink::shell
@@ -11,8 +12,8 @@ namespace vclink::shell
 /// What to do if access was refused, in a sentence or a few. libgit2's own text often names another
 /// cause, and never says what to do.
 /// @param failure of the operation
-/// @param credentials the kinds that the server asked for last, see RemoteNotes
+/// @param notes of the operation
 /// @return an empty text if the failure has another cause
-std::string explainRefusedAccess(const git::GitError &failure, unsigned credentials);
+std::string explainRefusedAccess(const git::GitError &failure, const RemoteNotes &notes);
 
 } // namespace vclink::shell

@@ -209,6 +209,9 @@ constexpr Translation failureRows[] = {
      "Schlüssel\neines ssh-Agenten.",
      "サーバーがパスワードを要求しましたが、パスワードは送りません。ssh "
      "エージェントの鍵だけを使います。"},
+    {"The server rejects the user name or the password in the address.",
+     "Der Server weist den Benutzernamen oder das Passwort in der Adresse zurück.",
+     "アドレスのユーザー名またはパスワードがサーバーに拒否されました。"},
     {"The operation was cancelled.", "Der Vorgang wurde abgebrochen.",
      "操作はキャンセルされました。"},
     {"The command ended with an error of an unknown kind.",

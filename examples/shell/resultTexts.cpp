@@ -129,6 +129,14 @@ constexpr Translation resultRows[] = {
      "切り替えませんでした。%1% "
      "はタグでもあり、ブランチではなくタグのファイルが書き出されてしまいます。\n先にタグまたはブラ"
      "ンチの名前を変えてください。"},
+    {"Nothing was switched: '%1%' also means something else here, and its files would be written "
+     "instead of the\nbranch's. Use \"%2%\", or rename the branch.",
+     "Es wurde nicht gewechselt: '%1%' bezeichnet hier auch etwas anderes, und dessen Dateien "
+     "würden "
+     "geschrieben statt der\ndes Branch. Benutzen Sie \"%2%\", oder benennen Sie den Branch um.",
+     "切り替えませんでした。'%1%' "
+     "はここで別のものも指していて、ブランチではなくそちらのファイルが書き出されてしまいます。"
+     "\n\"%2%\" を使うか、ブランチの名前を変えてください。"},
     {"The current branch is %1%.", "Der aktuelle Branch ist %1%.", "現在のブランチは %1% です。"},
     {"%1% file", "%1% Datei", "%1% 個のファイル"},
     {"%1% files", "%1% Dateien", "%1% 個のファイル"},

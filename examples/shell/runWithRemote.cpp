@@ -57,8 +57,7 @@ ExitStatus runWithRemote(Session &session, const std::string &text, RemoteNotes 
         line.clear();
         tellServersWords(notes);
         tellFailure(failure);
-        const std::string explanation =
-            notes.credentials ? explainRefusedAccess(failure.getError(), *notes.credentials) : "";
+        const std::string explanation = explainRefusedAccess(failure.getError(), notes);
         if (!explanation.empty())
         {
             complain(explanation);

@@ -150,6 +150,23 @@ TEST_F(ShellPasswordAccess, IsRefusedWithoutAQuestion)
               "only uses the keys of an ssh agent.\n");
 }
 
+TEST_F(ShellPasswordAccess, SaysThatThePasswordInTheAddressIsRejected)
+{
+    std::string address = server().url(server().makeRepository());
+    address.insert(address.find("//") + 2, WebServer::user() + ":wrong@");
+    EXPECT_EQ(refuse(address),
+              "vclink-shell: The server rejects the user name or the password in the address.\n");
+}
+
+TEST_F(ShellPasswordAccess, IsAskedForIfTheAddressHasOnlyAUser)
+{
+    std::string address = server().url(server().makeRepository());
+    address.insert(address.find("//") + 2, WebServer::user() + "@");
+    EXPECT_EQ(refuse(address),
+              "vclink-shell: The server asked for a password. This program never sends one; it "
+              "only uses the keys of an ssh agent.\n");
+}
+
 TEST_F(ShellPasswordAccess, IsNoMatterWhereNobodyAsks)
 {
     const GitRepository repository = server().makeRepository();

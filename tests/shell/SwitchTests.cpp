@@ -165,6 +165,31 @@ TEST_F(ShellSwitch, RefusesABranchWhoseFilesWouldBeThoseOfATag)
     EXPECT_EQ(repository_.read("a"), "theirs\n");
 }
 
+TEST_F(ShellSwitch, RefusesABranchWhoseNameMeansSomethingElse)
+{
+    const std::string id = repository_.line({"rev-parse", "main"});
+    repository_.git({"fetch", "--quiet", ".", "main"});
+    repository_.write("a", "put aside\n");
+    repository_.git({"stash"});
+    for (const std::string &name :
+         {std::string("HEAD"), id, std::string("FETCH_HEAD"), std::string("stash")})
+    {
+        repository_.git({"update-ref", "refs/heads/" + name, "refs/heads/other"});
+        EXPECT_EQ(refuse({"switch", name}),
+                  "Nothing was switched: '" + name +
+                      "' also means something else here, and its files would be written instead of "
+                      "the\nbranch's. Use \"git switch " +
+                      name + "\", or rename the branch.\n");
+        const GitRepository twin(folder() / ("twin " + name));
+        std::filesystem::copy(repository_.path(), twin.path(),
+                              std::filesystem::copy_options::recursive);
+        twin.git({"switch", "--quiet", name});
+        EXPECT_EQ(twin.line({"symbolic-ref", "HEAD"}), "refs/heads/" + name);
+        EXPECT_EQ(twin.read("a"), "theirs\n");
+        repository_.git({"update-ref", "-d", "refs/heads/" + name});
+    }
+}
+
 TEST_F(ShellSwitch, ShowsItsProgress)
 {
     const CommandResult result = run({"--progress", "always", "switch", "other"});
