@@ -38,6 +38,14 @@ constexpr Translation failureRows[] = {
      "でリモートのコミットを取得し、マージしてからもう一度送ってください。代わりにリモートの\nコミ"
      "ットを破棄するには、ブランチの前に + を付けてください: \"vclink-shell push REMOTE "
      "+BRANCH\"。"},
+    {"Branches such as \"a\" and \"a/b\" can't exist side by side. If the remote has deleted the "
+     "older one,\n\"git fetch --prune REMOTE\" deletes it here too, and fetches the new one.",
+     "Branches wie \"a\" und \"a/b\" kann es nicht zugleich geben. Wenn der ältere dort gelöscht "
+     "ist, "
+     "löscht\n\"git fetch --prune REMOTE\" ihn auch hier und holt den neuen.",
+     "\"a\" と \"a/b\" "
+     "のようなブランチは同時に存在できません。古い方がリモートで削除されていれば、\n"
+     "\"git fetch --prune REMOTE\" でここでも削除され、新しい方が取得されます。"},
     {"libgit2 does not know the format of this repository; core.repositoryformatversion and "
      "extensions in\n%1% describe it. If git can work here, use git.",
      "libgit2 kennt das Format dieses Repositorys nicht; core.repositoryformatversion und "

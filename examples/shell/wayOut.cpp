@@ -128,6 +128,17 @@ bool isOfFormat(const ustring &message)
            message.find(u"unknown object format ") == 0;
 }
 
+/// Whether a fetch could not make a reference, because an older one has the name of its folder, or
+/// is in a folder of its name. libgit2's text depends on whether the older one is packed.
+bool isBlockedByOlder(const ustring &message)
+{
+    const auto has = [&message](const ustring &words)
+    { return message.find(words) != ustring::npos; };
+    return has(u"refs/remotes/") &&
+           (has(u"collides with existing one") || has(u"there are refs beneath that folder") ||
+            has(u"parent is not directory"));
+}
+
 std::string nameOf(::uid_t user)
 {
     const ::passwd *const entry = ::getpwuid(user);
@@ -167,6 +178,13 @@ void tellWayOut(Session &session)
             complain(say("Download the remote's commits with \"vclink-shell fetch\", merge them, "
                          "and push again. To discard\nthem there instead, put a plus before the "
                          "branch: \"vclink-shell push REMOTE +BRANCH\"."));
+        }
+        else if (isBlockedByOlder(failure.getError().getMessage()))
+        {
+            complain(
+                say("Branches such as \"a\" and \"a/b\" can't exist side by side. If the remote "
+                    "has deleted the older one,\n\"git fetch --prune REMOTE\" deletes it here "
+                    "too, and fetches the new one."));
         }
         else if (isOfFormat(failure.getError().getMessage()))
         {

@@ -1,4 +1,6 @@
 // SPDX-License-Identifier: MIT
+#include <utility>
+
 #include <gmock/gmock.h>
 
 #include "ShellRemoteFixture.hpp"
@@ -8,6 +10,7 @@ namespace vclink::test
 namespace
 {
 
+using testing::EndsWith;
 using testing::HasSubstr;
 using testing::Not;
 using testing::StartsWith;
@@ -86,6 +89,34 @@ TEST_F(ShellFetch, KeepsABranchThatIsGoneAtTheRemote)
     colleague_.git({"push", "--quiet", "origin", ":new"});
     succeed({"fetch", "origin"});
     EXPECT_EQ(references(repository_), before);
+}
+
+/// libgit2 creates references before it prunes.
+TEST_F(ShellFetch, NamesTheCommandForABranchThatTheRemoteReplacedByOneInItsFolder)
+{
+    repository_.git({"config", "fetch.prune", "true"});
+    for (const bool isPacked : {false, true})
+    {
+        for (const auto &[older, newer] :
+             {std::pair("new", "new/one"), std::pair("new/one", "new")})
+        {
+            SCOPED_TRACE(older + std::string(isPacked ? ", packed" : ""));
+            repository_.git({"fetch", "--quiet", "--prune", "origin"});
+            ASSERT_EQ(references(repository_).count("refs/remotes/origin/" + std::string(older)),
+                      1U);
+            if (isPacked)
+                repository_.git({"pack-refs", "--all"});
+            colleague_.git({"push", "--quiet", "origin", ":" + std::string(older)});
+            colleague_.git({"push", "--quiet", "origin", "main:refs/heads/" + std::string(newer)});
+            EXPECT_THAT(refuse({"fetch", "origin"}),
+                        EndsWith("\nvclink-shell: Branches such as \"a\" and \"a/b\" can't exist "
+                                 "side by side. If the remote has deleted the older one,\n\"git "
+                                 "fetch --prune REMOTE\" deletes it here too, and fetches the new "
+                                 "one.\n"));
+        }
+    }
+    repository_.git({"fetch", "--quiet", "--prune", "origin"});
+    succeed({"fetch", "origin"});
 }
 
 TEST_F(ShellFetch, FindsARemoteWithARelativePathFromTheRoot)

@@ -63,6 +63,8 @@ bool isForPrograms(const std::string &text)
         "is not in this partial clone",
         // of libgit2
         "unsupported repository ", "unsupported extension ", "unknown object format ",
+        "collides with existing one", "there are refs beneath that folder",
+        "parent is not directory",
         // a failure of the system
         "A pipe can't be made", "Standard output is closed."};
     const bool isCommand = text.rfind("git ", 0) == 0 || text.rfind("vclink-shell ", 0) == 0;
