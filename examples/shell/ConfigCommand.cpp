@@ -1,14 +1,20 @@
 // SPDX-License-Identifier: MIT
+#include <array>
+#include <cstdlib>
+#include <filesystem>
 #include <optional>
 #include <string>
-#include <utility>
+#include <system_error>
+#include <vector>
 
 #include <CLI/CLI.hpp>
 
 #include "Output.hpp"
 #include "Session.hpp"
 #include "commands.hpp"
+#include "failures.hpp"
 #include "fl/i18n/convert.hpp"
+#include "gitProgram.hpp"
 #include "names.hpp"
 #include "runStoppable.hpp"
 #include "texts.hpp"
@@ -18,6 +24,84 @@ namespace vclink::shell
 {
 namespace
 {
+
+namespace fs = std::filesystem;
+
+struct Setting
+{
+    std::string key;
+    std::optional<ustring> value;
+};
+
+std::array<Setting, 3> readSettings(const git::GitConfig &config)
+{
+    return {Setting{"merge.vkAutoMerge.driver", config.readAutoMergeDriver()},
+            Setting{"mergetool.vkMerge.cmd", config.readMergeTool()},
+            Setting{"difftool.vkDiff.cmd", config.readDiffTool()}};
+}
+
+/// The file that libgit2 writes to.
+/// @return an empty path if there is none
+fs::path findWrittenFile(const git::GitConfig &config)
+{
+    const char *const xdg = std::getenv("XDG_CONFIG_HOME");
+    const char *const home = std::getenv("HOME");
+    fs::path folder = xdg != nullptr ? xdg : "";
+    if (xdg == nullptr && home != nullptr)
+    {
+        folder = fs::path(home) / ".config";
+    }
+    fs::path file = folder / "git/config";
+    std::error_code ignored;
+    if (!folder.empty() && fs::exists(file, ignored))
+    {
+        return file;
+    }
+    const std::optional<upath> global = config.globalFilePath();
+    return global ? nativePath(*global) : fs::path();
+}
+
+/// What git uses outside of repositories, whose own configuration may intentionally differ.
+struct UsedSetting
+{
+    fs::path file;
+    std::string value;
+};
+
+/// @return nothing if git is not installed, or finds no value in a file
+std::optional<UsedSetting> askGit(const std::string &key)
+{
+    const std::string origin = "file:";
+    const std::vector<std::string> parts =
+        splitAtNul(runGit("/", {"config", "-z", "--show-origin", "--get", key}).value_or(""));
+    if (parts.size() != 2 || parts.front().find(origin) != 0)
+    {
+        return std::nullopt;
+    }
+    return UsedSetting{parts.front().substr(origin.size()), parts.back()};
+}
+
+/// git reads .gitconfig after the file that libgit2 writes to, if the user has both.
+/// @return whether git uses what was written
+bool checkThatGitUses(const git::GitConfig &config)
+{
+    bool isUsed = true;
+    for (const auto &[key, value] : readSettings(config))
+    {
+        const std::optional<UsedSetting> used = askGit(key);
+        if (!value || !used || fl::i18n::utf8_to_ustring(used->value) == *value)
+        {
+            continue;
+        }
+        isUsed = false;
+        complain(
+            say("%1% was written to %2%, but git uses the value in\n%3%. Remove that one: %4%", key,
+                quoteName(makePath(findWrittenFile(config)).string()),
+                quoteName(makePath(used->file).string()),
+                "git config --file " + quoteForShell(used->file.string()) + " --unset-all " + key));
+    }
+    return isUsed;
+}
 
 class ConfigCommand : public Command
 {
@@ -34,16 +118,11 @@ class ConfigCommand : public Command
     ExitStatus run(Session &session) override
     {
         git::GitConfig config;
-        if (!writes_)
+        if (writes_)
         {
-            show(config, session.output());
+            return install(session, config);
         }
-        else if (const ExitStatus status =
-                     runStoppable(session, Stops::Never, [&config] { write(config); });
-                 status != Done)
-        {
-            return status;
-        }
+        show(config, session.output());
         const std::optional<upath> file = config.globalFilePath();
         remark(file ? say("Git's configuration of this user: %1%", nativePath(*file).string())
                     : say("There is no .gitconfig in the home folder."));
@@ -51,6 +130,21 @@ class ConfigCommand : public Command
     }
 
   private:
+    static ExitStatus install(Session &session, git::GitConfig &config)
+    {
+        const ExitStatus status = runStoppable(session, Stops::Never, [&config] { write(config); });
+        if (status != Done)
+        {
+            return status;
+        }
+        if (!checkThatGitUses(config))
+        {
+            return Failed;
+        }
+        remark(say("Git's configuration of this user: %1%", findWrittenFile(config).string()));
+        return Done;
+    }
+
     static void write(git::GitConfig &config)
     {
         config.writeAutoMergeDriver();
@@ -60,14 +154,11 @@ class ConfigCommand : public Command
 
     static void show(const git::GitConfig &config, Output &output)
     {
-        for (const auto &[key, value] :
-             {std::pair("merge.vkAutoMerge.driver", config.readAutoMergeDriver()),
-              std::pair("mergetool.vkMerge.cmd", config.readMergeTool()),
-              std::pair("difftool.vkDiff.cmd", config.readDiffTool())})
+        for (const auto &[key, value] : readSettings(config))
         {
             if (value)
             {
-                output.write(std::string(key) + '\t' + makePrintableLine(*value) + '\n');
+                output.write(key + '\t' + makePrintableLine(*value) + '\n');
             }
         }
         output.flush();

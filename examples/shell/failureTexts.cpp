@@ -217,6 +217,9 @@ constexpr Translation failureRows[] = {
      "Schlüssel\neines ssh-Agenten.",
      "サーバーがパスワードを要求しましたが、パスワードは送りません。ssh "
      "エージェントの鍵だけを使います。"},
+    {"%1% was written to %2%, but git uses the value in\n%3%. Remove that one: %4%",
+     "%1% wurde in %2% geschrieben, aber git benutzt den Wert in\n%3%. Entfernen Sie diesen: %4%",
+     "%1% を %2% に書き込みましたが、git は\n%3% の値を使います。その値を削除してください: %4%"},
     {"The server rejects the user name or the password in the address.",
      "Der Server weist den Benutzernamen oder das Passwort in der Adresse zurück.",
      "アドレスのユーザー名またはパスワードがサーバーに拒否されました。"},

@@ -9,6 +9,7 @@ namespace vclink::test
 namespace
 {
 
+using testing::EndsWith;
 using testing::HasSubstr;
 using testing::StartsWith;
 
@@ -102,6 +103,41 @@ TEST_F(ShellConfig, NamesTheFileForAPerson)
     set("core.editor", "mine");
     EXPECT_EQ(show(), "Git's configuration of this user: " +
                           (environment().home() / ".gitconfig").string() + "\n");
+}
+
+/// libgit2 writes to the first file, git prefers the values in the second one.
+TEST_F(ShellConfig, FailsIfGitGoesOnUsingAnotherValue)
+{
+    const std::string home = environment().home();
+    const std::string written = home + "/.config/git/config";
+    GitRepository(home).write(".config/git/config", "");
+    const CommandResult first = run({"config", "--write"});
+    EXPECT_EQ(first.exitStatus, 0) << first.errors;
+    EXPECT_EQ(first.errors, "");
+    EXPECT_THAT(runOnTerminal({"env", "TERM=xterm", VCLINK_SHELL, "config", "--write"}).text,
+                EndsWith("Git's configuration of this user: " + written + "\n"));
+    // git config writes to this file if it exists.
+    GitRepository(home).write(".gitconfig", "[mergetool \"vkMerge\"]\n\tcmd = old\n");
+    const CommandResult result = run({"config", "--write"});
+    EXPECT_EQ(result.exitStatus, 1);
+    EXPECT_EQ(result.errors, "vclink-shell: mergetool.vkMerge.cmd was written to " + written +
+                                 ", but git uses the value in\n" + home +
+                                 "/.gitconfig. Remove that one: git config --file " + home +
+                                 "/.gitconfig --unset-all mergetool.vkMerge.cmd\n");
+    EXPECT_EQ(ask("mergetool.vkMerge.cmd"), "old\n");
+    ASSERT_TRUE(Command({"git", "config", "--file", home + "/.gitconfig", "--unset-all",
+                         "mergetool.vkMerge.cmd"})
+                    .run()
+                    .succeeded());
+    EXPECT_EQ(run({"config", "--write"}).exitStatus, 0);
+}
+
+/// A working copy's own value is intentional.
+TEST_F(ShellConfig, InstallsThemWhateverTheWorkingCopyHas)
+{
+    const GitRepository repository = makeRepository();
+    repository.git({"config", "mergetool.vkMerge.cmd", "own"});
+    EXPECT_EQ(runIn(repository.path(), {"config", "--write"}).errors, "");
 }
 
 TEST_F(ShellConfig, FailsWhereTheFileCannotBeReadOrWritten)

@@ -14,7 +14,8 @@ namespace vclink::git
 
 /// Reads and writes the host's merge and diff tools in the user's global Git configuration. Uses
 /// the user's XDG file if it exists, otherwise `.gitconfig` in the home folder, which the first
-/// write creates. Holds a LibGit2Guard. Use it on one thread at a time.
+/// write creates. If both exist, git prefers a value in `.gitconfig` to the written one. Holds a
+/// LibGit2Guard. Use it on one thread at a time.
 class VCLINK_GIT_EXPORT GitConfig
 {
   public:
