@@ -16,6 +16,7 @@
 #include "remotes.hpp"
 #include "runWithRemote.hpp"
 #include "texts.hpp"
+#include "vclink/git/BranchManager.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
 
 namespace vclink::shell
@@ -141,6 +142,28 @@ void generate(WorkingCopyGenerator &generator, const ustring &specifier,
     }
 }
 
+/// Whether the clone has branches of the remote, but no files, because the remote's HEAD names a
+/// branch that does not exist. libgit2 does not warn of it.
+bool hasOnlyOtherBranches(Session &session, const std::filesystem::path &folder)
+{
+    constexpr int isUnborn = -9; // GIT_EUNBORNBRANCH
+    try
+    {
+        const auto adapter =
+            session.factory().createAdapterFor(makePath(folder), session.interactor());
+        const auto manager = git::BranchManager::create(*adapter);
+        if (!manager->getRemoteBranches().empty())
+        {
+            manager->getCurrentBranch();
+        }
+    }
+    catch (const git::LibGit2Exception &failure)
+    {
+        return failure.getError().getCode() == isUnborn;
+    }
+    return false;
+}
+
 class CloneCommand : public Command
 {
   public:
@@ -170,14 +193,22 @@ class CloneCommand : public Command
         const std::string text = say("Cloning into %1%:", quoteName(makePath(folder).string()));
         remark(text);
         RemoteNotes notes;
+        const std::filesystem::path real = withoutLinks(folder);
         const ExitStatus status =
             runStoppableWithRemote(session, Stops::BeforeWriting, text, notes,
-                                   [&] { generate(*generator, specifier, withoutLinks(folder)); });
-        if (status == Done)
+                                   [&] { generate(*generator, specifier, real); });
+        if (status != Done)
         {
-            remark(say("Done."));
+            return status;
         }
-        return status;
+        if (hasOnlyOtherBranches(session, real))
+        {
+            complain(say("The remote's current branch does not exist, so no files were written. "
+                         "List its branches with\n\"vclink-shell branches -r\", and check one "
+                         "out with \"git switch NAME\"."));
+        }
+        remark(say("Done."));
+        return Done;
     }
 
   private:

@@ -220,6 +220,14 @@ constexpr Translation failureRows[] = {
     {"%1% was written to %2%, but git uses the value in\n%3%. Remove that one: %4%",
      "%1% wurde in %2% geschrieben, aber git benutzt den Wert in\n%3%. Entfernen Sie diesen: %4%",
      "%1% を %2% に書き込みましたが、git は\n%3% の値を使います。その値を削除してください: %4%"},
+    {"The remote's current branch does not exist, so no files were written. List its branches "
+     "with\n\"vclink-shell branches -r\", and check one out with \"git switch NAME\".",
+     "Den aktuellen Branch des Remotes gibt es nicht, daher wurden keine Dateien geschrieben. "
+     "Seine "
+     "Branches\nzeigt \"vclink-shell branches -r\"; \"git switch NAME\" wechselt zu einem.",
+     "リモートの現在のブランチが存在しないため、ファイルは書き込まれませんでした。"
+     "\"vclink-shell branches -r\" で\nブランチを確認し、\"git switch NAME\" "
+     "で切り替えてください。"},
     {"The server rejects the user name or the password in the address.",
      "Der Server weist den Benutzernamen oder das Passwort in der Adresse zurück.",
      "アドレスのユーザー名またはパスワードがサーバーに拒否されました。"},

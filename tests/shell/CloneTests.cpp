@@ -157,6 +157,21 @@ TEST_F(ShellClone, MakesAnEmptyWorkingCopyOfAnEmptyRepository)
     EXPECT_EQ(made.line({"config", "remote.origin.url"}), server().url(empty));
 }
 
+TEST_F(ShellClone, SaysThatTheCurrentBranchOfTheRemoteDoesNotExist)
+{
+    served_.git({"symbolic-ref", "HEAD", "refs/heads/missing"});
+    const CommandResult result = runIn(folder().path(), {"clone", url_, "clone"});
+    EXPECT_EQ(result.exitStatus, 0);
+    EXPECT_EQ(result.errors,
+              "vclink-shell: The remote's current branch does not exist, so no files were written. "
+              "List its branches with\n\"vclink-shell branches -r\", and check one out with "
+              "\"git switch NAME\".\n");
+    const GitRepository made(folder() / "clone");
+    EXPECT_EQ(runIn(made.path(), {"branches", "-r"}).output, "origin/main\n");
+    made.git({"switch", "--quiet", "main"});
+    EXPECT_EQ(made.read("a"), "a\n");
+}
+
 TEST_F(ShellClone, TakesAnEmptyFolderAndNoOther)
 {
     fs::create_directory(folder() / "empty");
