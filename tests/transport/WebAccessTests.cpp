@@ -18,6 +18,7 @@
 namespace
 {
 
+using vclink::test::Command;
 using vclink::test::GitRepository;
 using vclink::test::LogCapture;
 using vclink::test::WebServer;
@@ -82,6 +83,30 @@ TEST_P(WebPassword, InTheAddressIsTakenByLibgit2Itself)
     std::string url = server().urlAt(GetParam(), served_);
     url.insert(url.find("//") + 2, WebServer::user() + ":" + WebServer::password() + "@");
     EXPECT_EQ(clone(url, "clone").line({"rev-parse", "HEAD"}), commit_);
+}
+
+/// A clone does: libgit2 writes it to the configuration and to the reflogs.
+TEST_P(WebPassword, InTheAddressIsNotWrittenByAFetch)
+{
+    std::string url = server().urlAt(GetParam(), served_);
+    url.insert(url.find("//") + 2, WebServer::user() + ":" + WebServer::password() + "@");
+    const GitRepository repository = makeRepository("fetching");
+    repository.git({"remote", "add", "origin", url});
+    fetch(repository);
+    EXPECT_EQ(repository.line({"reflog", "--format=%gs", "refs/remotes/origin/main"}),
+              "fetch origin");
+    EXPECT_THAT(repository.read(".git/FETCH_HEAD"),
+                testing::Not(testing::HasSubstr(WebServer::password())));
+    const GitRepository made = clone(url, "clone");
+    EXPECT_THAT(made.read(".git/logs/refs/remotes/origin/main"),
+                testing::HasSubstr(WebServer::password()));
+    made.git({"remote", "set-url", "origin", server().urlAt(GetParam(), served_)});
+    made.git({"reflog", "expire", "--expire=now", "--all"});
+    EXPECT_EQ(
+        Command({"grep", "--recursive", "--files-with-matches", WebServer::password(), made.path()})
+            .run()
+            .output,
+        "");
 }
 
 INSTANTIATE_TEST_SUITE_P(Sites, WebPassword,
