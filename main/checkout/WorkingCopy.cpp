@@ -162,7 +162,6 @@ void WorkingCopy::forget()
     entry_ = nullptr;
     missing_.clear();
     examined_.reset();
-    hasHidden_.reset();
     isKnown_ = false;
 }
 

@@ -76,7 +76,8 @@ class WorkingCopy
     /// since several rules ask for it.
     const git_index_entry *entryOf(const std::string &name);
 
-    /// Returns true if isHidden holds for an entry of the index. Remembers it.
+    /// Returns true if isHidden holds for an entry of the index. Remembers it for good: nothing
+    /// that this library does hides a file.
     [[nodiscard]] bool hasHidden();
 
     /// Returns true if the index has anything below a folder of this name.

@@ -18,7 +18,7 @@ namespace vclink::git
 namespace
 {
 
-constexpr std::size_t blockSize = std::size_t{128} * 1024;
+constexpr std::size_t blockSize = std::size_t{32} * 1024;
 
 [[noreturn]] void raiseUnreadable(int error, const std::string &index)
 {
