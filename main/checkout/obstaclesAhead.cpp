@@ -309,8 +309,7 @@ bool isDeletedByBoth(WorkingCopy &copy, const TreeChange &change)
 
 Finding findUnmerged(const WorkingCopy &copy)
 {
-    const bool hasConflicts = git_index_has_conflicts(copy.index()) != 0;
-    const std::size_t count = hasConflicts ? git_index_entrycount(copy.index()) : 0;
+    const std::size_t count = git_index_entrycount(copy.index());
     for (std::size_t i = 0; i < count; ++i)
     {
         const git_index_entry *const entry = git_index_get_byindex(copy.index(), i);

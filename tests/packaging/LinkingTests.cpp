@@ -13,6 +13,7 @@
 
 #include "InstalledFixture.hpp"
 #include "support/Command.hpp"
+#include "support/boostRelease.hpp"
 #include "support/strings.hpp"
 
 namespace
@@ -144,7 +145,8 @@ TEST(LibraryLinking, ChecksTheBoundsOfTheCLibrary)
 {
     const auto symbols = runToSuccess(Command({"readelf", "--wide", "--dyn-syms", VCLINK_LIBRARY}));
     EXPECT_THAT(symbols, HasSubstr(" UND __snprintf_chk@"));
-    EXPECT_THAT(symbols, Not(HasSubstr(" UND snprintf@")));
+    if (!boost_release::formatsIntoUnknownBuffers)
+        EXPECT_THAT(symbols, Not(HasSubstr(" UND snprintf@")));
 }
 #endif
 

@@ -16,4 +16,8 @@ constexpr bool isSince(int major, int minor)
 /// one place.
 constexpr bool keepsErrorBesideValue = !isSince(1, 76);
 
+/// A header formats numbers into a buffer of unknown size, which the C library cannot check. Not in
+/// 1.83.
+constexpr bool formatsIntoUnknownBuffers = isSince(1, 84);
+
 } // namespace vclink::test::boost_release

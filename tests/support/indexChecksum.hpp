@@ -18,10 +18,12 @@ inline void correctChecksum(std::string &index)
     const std::size_t end = index.size() - checksumSize;
     boost::uuids::detail::sha1 hash;
     hash.process_bytes(index.data(), end);
-    boost::uuids::detail::sha1::digest_type words{};
-    hash.get_digest(words);
+    boost::uuids::detail::sha1::digest_type digest{};
+    hash.get_digest(digest);
+    // Bytes, or words in releases without bytes.
+    constexpr std::size_t unit = sizeof digest[0];
     for (std::size_t i = 0; i < checksumSize; ++i)
-        index[end + i] = static_cast<char>(words[i / 4] >> (24 - i % 4 * 8));
+        index[end + i] = static_cast<char>(digest[i / unit] >> (unit - 1 - i % unit) * 8);
 }
 
 } // namespace vclink::test

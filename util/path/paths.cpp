@@ -47,10 +47,23 @@ fs::path resolveFromRoot(const fs::path &path)
     return missing.empty() ? existing : (existing / missing).lexically_normal();
 }
 
+/// Returns true if not even the first element of a relative path exists.
+bool isMissingRelative(const fs::path &path)
+{
+    boost::system::error_code error;
+    return path.is_relative() &&
+           (path.empty() || fs::status(*path.begin(), error).type() == fs::file_not_found);
+}
+
 /// Boost reads the working folder even if the path is absolute, and fails if that folder does not
 /// exist.
 fs::path weaklyCanonical(const fs::path &path)
 {
+    // Boost 1.74 leaves such a path as it is, 1.88 looks for it in the working folder.
+    if (isMissingRelative(path))
+    {
+        return path.lexically_normal();
+    }
     try
     {
         return fs::weakly_canonical(path);
