@@ -10,7 +10,6 @@ namespace
 {
 
 using testing::EndsWith;
-using testing::HasSubstr;
 using testing::StartsWith;
 
 /// It needs no working copy.

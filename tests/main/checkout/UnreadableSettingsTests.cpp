@@ -12,6 +12,7 @@
 
 #include "main/merge/MergeFixture.hpp"
 #include "support/WithoutLeakChecks.hpp"
+#include "support/text.hpp"
 
 namespace
 {
