@@ -7,7 +7,6 @@
 #include <optional>
 
 #include <boost/filesystem/exception.hpp>
-#include <boost/filesystem/operations.hpp>
 #include <git2.h>
 
 #include "check.hpp"
@@ -15,6 +14,7 @@
 #include "fl/i18n/convert.hpp"
 #include "support/GitRepository.hpp"
 #include "support/TemporaryFolder.hpp"
+#include "support/relativePath.hpp"
 #include "support/text.hpp"
 #include "util/path/PathspecArray.hpp"
 #include "util/path/paths.hpp"
@@ -76,27 +76,12 @@ template <class Call> std::optional<std::string> attempt(Call call)
     }
 }
 
-/// What Boost's relative path was before 1.81, which the library keeps to: a separator at the end
-/// is left out if the path exists, and "." follows it otherwise.
-std::string likeEarlierBoost(std::string relative, const std::string &path)
-{
-    if (relative.empty() || relative.back() != '/')
-        return relative;
-    boost::system::error_code ignored;
-    if (boost::filesystem::exists(path, ignored))
-        relative.pop_back();
-    else
-        relative += '.';
-    return relative;
-}
-
 /// @return the path below the root; empty when it can't be told or is none
 std::string checkRelative(const std::string &root, const std::string &path)
 {
     const auto relative = attempt(
         [&] { return ustring_to_utf8(vclink::git::relativeToRoot(asPath(root), asPath(path))); });
-    auto plain = attempt(
-        [&] { return likeEarlierBoost(boost::filesystem::relative(path, root).string(), path); });
+    auto plain = attempt([&] { return vclink::test::relativeOfBoost174(path, root); });
     if (plain)
         std::replace(plain->begin(), plain->end(), '\\', '/');
     require(relative == plain, "a path is what it is relative to the root");

@@ -8,11 +8,11 @@
 #include <vector>
 
 #include <boost/filesystem/exception.hpp>
-#include <boost/filesystem/operations.hpp>
 #include <gtest/gtest.h>
 
 #include "support/GitFixture.hpp"
 #include "support/WorkingFolder.hpp"
+#include "support/relativePath.hpp"
 #include "support/text.hpp"
 #include "util/path/paths.hpp"
 
@@ -24,24 +24,10 @@ using vclink::git::relativeToRoot;
 using vclink::git::RootRelativePaths;
 using namespace vclink::test;
 
-/// As Boost 1.74 does it: later releases look for a missing path in the working folder.
-boost::filesystem::path canonical(const boost::filesystem::path &path)
-{
-    const bool isMissing =
-        path.is_relative() && (path.empty() || !boost::filesystem::exists(*path.begin()));
-    return isMissing ? path.lexically_normal() : boost::filesystem::weakly_canonical(path);
-}
-
-/// What the operation is defined by, boost::filesystem::relative, as Boost 1.74 does it: later
-/// releases keep a separator at the end.
+/// What the operation is defined by.
 std::string oracle(const std::string &root, const std::string &path)
 {
-    std::string text = canonical(path).lexically_relative(canonical(root)).string();
-    if (text.size() > 1 && text.back() == '/')
-    {
-        text.pop_back();
-        text += boost::filesystem::exists(path) ? "" : "/.";
-    }
+    std::string text = relativeOfBoost174(path, root);
     std::replace(text.begin(), text.end(), '\\', '/');
     return text;
 }
