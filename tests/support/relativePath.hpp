@@ -18,8 +18,10 @@ inline std::string relativeOfBoost174(const std::string &path, const std::string
     boost::system::error_code ignored;
     const auto canonical = [&ignored](const fs::path &name)
     {
+        // A name that is too long is not known to be missing.
         const bool isMissing =
-            name.is_relative() && (name.empty() || !fs::exists(*name.begin(), ignored));
+            name.is_relative() &&
+            (name.empty() || fs::status(*name.begin(), ignored).type() == fs::file_not_found);
         return isMissing ? name.lexically_normal() : fs::weakly_canonical(name);
     };
     std::string text = canonical(path).lexically_relative(canonical(root)).string();
