@@ -26,6 +26,30 @@ constexpr std::array filesUnderWay{
     "MERGE_HEAD",   "MERGE_MSG",  "MERGE_MODE", "CHERRY_PICK_HEAD", "REVERT_HEAD",
     "vclink-merge", "index.lock", "HEAD.lock",  "config.lock",      "packed-refs.lock"};
 
+/// The git folder of a working tree, and the one that it shares with others or is its own.
+struct GitFolders
+{
+    fs::path own;
+    fs::path shared;
+
+    bool isLinked() const
+    {
+        return own != shared;
+    }
+};
+
+GitFolders foldersOf(git_repository *repository)
+{
+    const auto pathOf = [](const std::string &folder) { return fs::path(folder).parent_path(); };
+    return {pathOf(git_repository_path(repository)), pathOf(git_repository_commondir(repository))};
+}
+
+std::string describeStamp(const struct stat &status)
+{
+    return std::to_string(status.st_ino) + ' ' + std::to_string(status.st_mtim.tv_sec) + '.' +
+           std::to_string(status.st_mtim.tv_nsec);
+}
+
 void readEntry(const fs::path &path, const std::string &name, Snapshot &snapshot)
 {
     struct stat status = {};
@@ -42,17 +66,16 @@ void readEntry(const fs::path &path, const std::string &name, Snapshot &snapshot
     }
     snapshot.files[name] = text.str();
     if (!S_ISDIR(status.st_mode))
-        snapshot.stamps[name] = std::to_string(status.st_ino) + ' ' +
-                                std::to_string(status.st_mtim.tv_sec) + '.' +
-                                std::to_string(status.st_mtim.tv_nsec);
+        snapshot.stamps[name] = describeStamp(status);
 }
 
-void readFiles(const fs::path &copy, const fs::path &folder, Snapshot &snapshot)
+void readFiles(const fs::path &copy, const fs::path &folder, const fs::path &shared,
+               Snapshot &snapshot)
 {
     const fs::path own = copy / ".git";
     for (fs::recursive_directory_iterator entry(folder), end; entry != end; ++entry)
     {
-        if (entry->path() == own)
+        if (entry->path() == own || entry->path() == shared)
         {
             entry.disable_recursion_pending();
             continue;
@@ -111,6 +134,22 @@ void readHistory(git_repository *repository, Snapshot &snapshot)
                    .value()
                    .get());
     git_strarray_dispose(&names);
+}
+
+void readUnderWay(const fs::path &gitFolder, const std::string &prefix, Snapshot &snapshot)
+{
+    for (const auto *name : filesUnderWay)
+        if (fs::exists(gitFolder / name))
+            snapshot.underWay[prefix + name] = "there";
+}
+
+/// What an operation in a linked working tree leaves alone.
+void readMainTree(const fs::path &gitFolder, Snapshot &snapshot)
+{
+    snapshot.history["main HEAD"] = readFile(gitFolder / "HEAD");
+    struct stat status = {};
+    if (::stat((gitFolder / "index").c_str(), &status) == 0)
+        snapshot.stamps["main index"] = describeStamp(status);
 }
 
 int collectId(const char * /*root*/, const git_tree_entry *entry, void *payload)
@@ -184,13 +223,17 @@ std::string blobIdOf(const std::string &bytes)
 Snapshot takeSnapshot(const fs::path &copy, const fs::path &folder)
 {
     Snapshot snapshot;
-    readFiles(copy, folder, snapshot);
     const auto repository = acquire<git_repository>(git_repository_open, copy.c_str()).value();
+    const GitFolders folders = foldersOf(repository.get());
+    readFiles(copy, folder, folders.shared, snapshot);
     readIndex(repository.get(), snapshot);
     readHistory(repository.get(), snapshot);
-    for (const auto *name : filesUnderWay)
-        if (fs::exists(copy / ".git" / name))
-            snapshot.underWay[name] = "there";
+    readUnderWay(folders.own, "", snapshot);
+    if (folders.isLinked())
+    {
+        readUnderWay(folders.shared, "main ", snapshot);
+        readMainTree(folders.shared, snapshot);
+    }
     return snapshot;
 }
 

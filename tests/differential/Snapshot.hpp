@@ -18,12 +18,13 @@ struct Snapshot
     Entries files;
     /// Mode, id, stage and flags of each entry of the index.
     Entries index;
-    /// HEAD, every reference, the tree and the parents of HEAD's commit.
+    /// HEAD, every reference, the tree and the parents of HEAD's commit. In a linked working tree,
+    /// also HEAD of the main one.
     Entries history;
     /// The files of an operation that is under way, and locks.
     Entries underWay;
-    /// Inode and time of change of each file and link: if both are equal, nobody wrote it in
-    /// between.
+    /// Inode and time of change of each file and link, and of the main working tree's index beside
+    /// a linked one: if both are equal, nobody wrote it in between.
     Entries stamps;
     /// The ids of what the files and links hold, and of the index's entries.
     Entries fileIds;

@@ -134,6 +134,26 @@ void GitRepository::write(const std::string &name, const std::string &bytes) con
     writeFile(file, bytes);
 }
 
+std::filesystem::path GitRepository::gitFolder() const
+{
+    const std::string beginning = "gitdir: ";
+    const auto folder = path_ / ".git";
+    if (std::filesystem::is_directory(folder))
+        return folder;
+    const std::string text = withoutLineFeed(readOrThrow(folder));
+    if (text.compare(0, beginning.size(), beginning) != 0)
+        throw std::runtime_error("no git folder in " + path_.string());
+    return (path_ / text.substr(beginning.size())).lexically_normal();
+}
+
+std::filesystem::path GitRepository::sharedGitFolder() const
+{
+    const auto own = gitFolder();
+    if (!std::filesystem::exists(own / "commondir"))
+        return own;
+    return (own / withoutLineFeed(readOrThrow(own / "commondir"))).lexically_normal();
+}
+
 std::string GitRepository::read(const std::string &name) const
 {
     return readOrThrow(path_ / name);

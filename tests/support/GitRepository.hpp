@@ -33,6 +33,10 @@ class GitRepository
     {
         return path_ / name;
     }
+    /// The folder ".git", or the one that a file ".git" names: it has the index and HEAD.
+    std::filesystem::path gitFolder() const;
+    /// The folder with what all working trees of a repository share, e.g. its configuration.
+    std::filesystem::path sharedGitFolder() const;
 
     /// Copies the working copy with all it holds, in place of what is there.
     GitRepository copyTo(const std::filesystem::path &folder) const;

@@ -77,7 +77,11 @@ const std::vector<Place> &unfoldedSubmodulePlaces();
 void makeSubmoduleSurroundings(const std::filesystem::path &folder);
 void makeSubmoduleSurroundingsWithSiblings(const std::filesystem::path &folder);
 
-/// Copies what makeSurroundings() has made.
+/// Turns what makeSurroundings() has made into a repository "main", whose HEAD is detached, and
+/// "copy", a linked working tree of it.
+void linkSurroundings(const std::filesystem::path &folder);
+
+/// Copies what makeSurroundings() and linkSurroundings() have made.
 void copySurroundings(const std::filesystem::path &from, const std::filesystem::path &to);
 
 /// Puts the files and the index back to what makeSurroundings() has made, and nothing else.

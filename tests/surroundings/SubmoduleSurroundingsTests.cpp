@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include <algorithm>
 #include <string>
+#include <tuple>
 #include <vector>
 
 #include <gtest/gtest.h>
@@ -90,9 +91,9 @@ const std::vector<std::string> otherObstacles{"untracked file",
 class SubmoduleSurroundings : public Surroundings
 {
   protected:
-    explicit SubmoduleSurroundings(bool hasSiblings = false)
-        : Surroundings(hasSiblings ? makeSubmoduleSurroundingsWithSiblings
-                                   : makeSubmoduleSurroundings)
+    SubmoduleSurroundings(bool hasSiblings, Tree tree)
+        : Surroundings(
+              hasSiblings ? makeSubmoduleSurroundingsWithSiblings : makeSubmoduleSurroundings, tree)
     {
         obstacles_ = submoduleObstacles();
         for (Obstacle obstacle : allObstacles())
@@ -107,51 +108,57 @@ class SubmoduleSurroundings : public Surroundings
     std::vector<Obstacle> obstacles_;
 };
 
-class BranchesWithSubmodules : public testing::WithParamInterface<BranchOperation>,
-                               public SubmoduleSurroundings
+class BranchesWithSubmodules
+    : public testing::WithParamInterface<std::tuple<BranchOperation, Tree>>,
+      public SubmoduleSurroundings
 {
   protected:
-    BranchesWithSubmodules() : SubmoduleSurroundings(GetParam().hasSiblings)
+    BranchesWithSubmodules()
+        : SubmoduleSurroundings(std::get<BranchOperation>(GetParam()).hasSiblings,
+                                std::get<Tree>(GetParam()))
     {
     }
 };
 
 TEST_P(BranchesWithSubmodules, LoseNothingThatGitKeepsAndOtherwiseDifferByRuleOnly)
 {
-    checkOperation(GetParam(), obstacles_);
+    checkOperation(std::get<BranchOperation>(GetParam()), obstacles_);
 }
 
-INSTANTIATE_TEST_SUITE_P(Operations, BranchesWithSubmodules, testing::ValuesIn(submoduleOperations),
-                         [](const auto &instance)
-                         {
-                             std::string name = testing::PrintToString(instance.param);
-                             std::replace_if(
-                                 name.begin(), name.end(),
-                                 [](char character)
-                                 { return character == ' ' || character == '-'; },
-                                 '_');
-                             return name;
-                         });
+std::string
+nameOfSubmoduleOperation(const testing::TestParamInfo<std::tuple<BranchOperation, Tree>> &instance)
+{
+    const auto &[operation, tree] = instance.param;
+    std::string name = testing::PrintToString(operation);
+    std::replace_if(
+        name.begin(), name.end(),
+        [](char character) { return character == ' ' || character == '-'; }, '_');
+    return name + testing::PrintToString(tree);
+}
 
-class RevertsWithSubmodules : public testing::WithParamInterface<Listed>,
+INSTANTIATE_TEST_SUITE_P(Operations, BranchesWithSubmodules,
+                         testing::Combine(testing::ValuesIn(submoduleOperations), trees),
+                         nameOfSubmoduleOperation);
+
+class RevertsWithSubmodules : public testing::WithParamInterface<std::tuple<Listed, Tree>>,
                               public SubmoduleSurroundings
 {
   protected:
-    RevertsWithSubmodules() : SubmoduleSurroundings(GetParam() == Listed::ObstacleAndSibling)
+    RevertsWithSubmodules()
+        : SubmoduleSurroundings(std::get<Listed>(GetParam()) == Listed::ObstacleAndSibling,
+                                std::get<Tree>(GetParam()))
     {
     }
 };
 
 TEST_P(RevertsWithSubmodules, LoseNothingThatGitKeepsAndOtherwiseDifferByRuleOnly)
 {
-    checkReverts(GetParam() == Listed::OtherFile ? "revert of a file beside submodules"
-                                                 : "revert of submodules",
-                 GetParam(), "mine", submodulePlaces(), obstacles_);
+    const Listed listed = std::get<Listed>(GetParam());
+    checkReverts(listed == Listed::OtherFile ? "revert of a file beside submodules"
+                                             : "revert of submodules",
+                 listed, "mine", submodulePlaces(), obstacles_);
 }
 
-INSTANTIATE_TEST_SUITE_P(Lists, RevertsWithSubmodules,
-                         testing::Values(Listed::Obstacle, Listed::OtherFile,
-                                         Listed::ObstacleAndSibling),
-                         testing::PrintToStringParamName());
+INSTANTIATE_TEST_SUITE_P(Lists, RevertsWithSubmodules, allLists, nameOfList);
 
 } // namespace

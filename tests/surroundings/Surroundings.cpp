@@ -67,11 +67,25 @@ std::ostream &operator<<(std::ostream &stream, Listed listed)
                                                    : "OfWhatIsInTheWayAndSiblings");
 }
 
-Surroundings::Surroundings(void (*make)(const fs::path &folder))
+std::ostream &operator<<(std::ostream &stream, Tree tree)
+{
+    return stream << (tree == Tree::Linked ? "InALinkedTree" : "");
+}
+
+std::string nameOfList(const testing::TestParamInfo<std::tuple<Listed, Tree>> &instance)
+{
+    const auto &[listed, tree] = instance.param;
+    return testing::PrintToString(listed) + testing::PrintToString(tree);
+}
+
+Surroundings::Surroundings(void (*make)(const fs::path &folder), Tree tree)
+    : tree_(tree), isWhole_(tree == Tree::Main || std::getenv("VCLINK_ALL_SITUATIONS") != nullptr)
 {
     std::ofstream(environment().home() / ".gitconfig")
         << "[user]\n\tname = Somebody\n\temail = somebody@example.com\n";
     make(original_);
+    if (tree == Tree::Linked)
+        linkSurroundings(original_);
 }
 
 void Surroundings::go(const std::string &branch)
@@ -94,7 +108,8 @@ void Surroundings::checkOperation(const BranchOperation &operation,
             const bool isLeftOut =
                 (!operation.branches.empty() && !contains(operation.branches, place.branch)) ||
                 (operation.hasSiblings && !hasSibling(place));
-            if (obstacle.place != place.holds || commonOnes < operation.commonOnes || isLeftOut)
+            if (!isWanted(obstacle, place, obstacles) || commonOnes < operation.commonOnes ||
+                isLeftOut)
                 continue;
             auto byGit = operation.byGit;
             byGit.push_back(place.branch);
@@ -122,7 +137,8 @@ void Surroundings::checkReverts(const std::string &operation, Listed listed,
         {
             const bool isWorthwhile =
                 hasSiblings ? hasSibling(place) : listed == Listed::Obstacle || obstacle.isCommon;
-            if (obstacle.place != place.holds || place.branch != "unrelated" || !isWorthwhile)
+            if (!isWanted(obstacle, place, obstacles) || place.branch != "unrelated" ||
+                !isWorthwhile)
                 continue;
             std::vector<std::string> names{missing};
             std::vector<std::string> byGit{
@@ -161,11 +177,22 @@ void Surroundings::checkReverts(const std::string &operation, Listed listed,
     conclude(operation, hasSiblings);
 }
 
+bool Surroundings::isWanted(const Obstacle &obstacle, const Place &place,
+                            const std::vector<Obstacle> &obstacles) const
+{
+    const auto isCommonOne = [&place](const Obstacle &other)
+    { return other.isCommon && other.place == place.holds; };
+    const bool isCommon =
+        obstacle.isCommon || std::none_of(obstacles.begin(), obstacles.end(), isCommonOne);
+    return obstacle.place == place.holds && (isWhole_ || (isCommon && place.isCommon));
+}
+
 void Surroundings::check(const Cell &cell)
 {
     const std::string name = cell.situation.operation + ": " + cell.obstacle.name + ", " +
                              cell.place.name + " (" + cell.place.path + ')' +
-                             (cell.situation.hasSiblings ? " beside a sibling" : "");
+                             (cell.situation.hasSiblings ? " beside a sibling" : "") +
+                             (tree_ == Tree::Linked ? " in a linked tree" : "");
     const char *const wanted = std::getenv("VCLINK_CELL");
     if (wanted != nullptr && name.find(wanted) == std::string::npos)
         return;
@@ -191,10 +218,13 @@ bool Surroundings::hasSibling(const Place &place) const
 void Surroundings::conclude(const std::string &operation, bool hasSiblings) const
 {
     std::cout << cells_ << " situations of " << operation << (hasSiblings ? " beside siblings" : "")
-              << '\n';
+              << (tree_ == Tree::Linked ? " in a linked tree" : "") << '\n';
     for (const auto &[outcome, count] : outcomes_)
         std::cout << "  " << count << " x " << outcome << '\n';
     if (std::getenv("VCLINK_CELL") != nullptr)
+        return;
+    EXPECT_GE(cells_, 1);
+    if (!isWhole_)
         return;
     const bool isLarge = !hasSiblings && (operation == "merge" || operation == "switch");
     EXPECT_GE(cells_, isLarge ? 200 : 7);

@@ -8,7 +8,10 @@
 #include <map>
 #include <set>
 #include <string>
+#include <tuple>
 #include <vector>
+
+#include <gtest/gtest.h>
 
 #include "Situation.hpp"
 #include "differential/Snapshot.hpp"
@@ -46,6 +49,16 @@ std::ostream &operator<<(std::ostream &stream, const BranchOperation &operation)
 void mergeBranch(git::BranchManager &branches, const std::string &branch);
 void switchBranch(git::BranchManager &branches, const std::string &branch);
 
+/// Which working tree the operation is in.
+enum class Tree
+{
+    Main,
+    Linked
+};
+
+/// What follows the name of a test.
+std::ostream &operator<<(std::ostream &stream, Tree tree);
+
 /// What is in the list of a revert.
 enum class Listed
 {
@@ -56,13 +69,23 @@ enum class Listed
 
 std::ostream &operator<<(std::ostream &stream, Listed listed);
 
+/// Parameters of the suites.
+inline const auto trees = testing::Values(Tree::Main, Tree::Linked);
+inline const auto allLists = testing::Combine(
+    testing::Values(Listed::Obstacle, Listed::OtherFile, Listed::ObstacleAndSibling), trees);
+
+/// Names a test of a suite of reverts.
+std::string nameOfList(const testing::TestParamInfo<std::tuple<Listed, Tree>> &instance);
+
 /// Every obstacle in every place, for one operation: the library in one working copy, git in its
-/// twin. VCLINK_CELL names a part of the situations to look at alone, as they are printed.
+/// twin. In a linked working tree, only common places, with the common obstacles or, if there are
+/// none, with all; VCLINK_ALL_SITUATIONS lifts this limit. VCLINK_CELL names a part of the
+/// situations to look at alone, as they are printed.
 class Surroundings : public GitFixture
 {
   protected:
     /// @param make makes what the twins are copies of
-    explicit Surroundings(void (*make)(const std::filesystem::path &folder));
+    Surroundings(void (*make)(const std::filesystem::path &folder), Tree tree);
 
     void go(const std::string &branch);
     /// The working copy that the twins are copies of.
@@ -88,6 +111,8 @@ class Surroundings : public GitFixture
         Change prepare = changesNothing;
     };
 
+    bool isWanted(const Obstacle &obstacle, const Place &place,
+                  const std::vector<Obstacle> &obstacles) const;
     void check(const Cell &cell);
     /// Says what the situations came to, and expects that each difference has been met.
     void conclude(const std::string &operation, bool hasSiblings = false) const;
@@ -107,6 +132,8 @@ class Surroundings : public GitFixture
     static bool isForSiblings(const Comparand &comparand);
 
     LibGit2Session session_{environment()};
+    const Tree tree_;
+    const bool isWhole_;
     const std::filesystem::path original_ = folder() / "original";
     std::set<std::string> committed_;
     std::map<std::string, Snapshot> references_;

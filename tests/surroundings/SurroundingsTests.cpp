@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include <ostream>
 #include <string>
+#include <tuple>
 #include <vector>
 
 #include <gtest/gtest.h>
@@ -35,49 +36,57 @@ const std::vector<BranchOperation> operations{
 class FileSurroundings : public Surroundings
 {
   protected:
-    explicit FileSurroundings(bool hasSiblings)
-        : Surroundings(hasSiblings ? makeSurroundingsWithSiblings : makeSurroundings)
+    FileSurroundings(bool hasSiblings, Tree tree)
+        : Surroundings(hasSiblings ? makeSurroundingsWithSiblings : makeSurroundings, tree)
     {
     }
 };
 
-class BranchSurroundings : public testing::WithParamInterface<BranchOperation>,
+class BranchSurroundings : public testing::WithParamInterface<std::tuple<BranchOperation, Tree>>,
                            public FileSurroundings
 {
   protected:
-    BranchSurroundings() : FileSurroundings(GetParam().hasSiblings)
+    BranchSurroundings()
+        : FileSurroundings(std::get<BranchOperation>(GetParam()).hasSiblings,
+                           std::get<Tree>(GetParam()))
     {
     }
 };
 
 TEST_P(BranchSurroundings, LoseNothingThatGitKeepsAndOtherwiseDifferByRuleOnly)
 {
-    checkOperation(GetParam(), allObstacles());
+    checkOperation(std::get<BranchOperation>(GetParam()), allObstacles());
 }
 
-INSTANTIATE_TEST_SUITE_P(Operations, BranchSurroundings, testing::ValuesIn(operations),
-                         [](const auto &instance) {
-                             return instance.param.name +
-                                    (instance.param.hasSiblings ? "BesideSiblings" : "");
-                         });
+std::string
+nameOfOperation(const testing::TestParamInfo<std::tuple<BranchOperation, Tree>> &instance)
+{
+    const auto &[operation, tree] = instance.param;
+    return operation.name + (operation.hasSiblings ? "BesideSiblings" : "") +
+           testing::PrintToString(tree);
+}
 
-class RevertSurroundings : public testing::WithParamInterface<Listed>, public FileSurroundings
+INSTANTIATE_TEST_SUITE_P(Operations, BranchSurroundings,
+                         testing::Combine(testing::ValuesIn(operations), trees), nameOfOperation);
+
+class RevertSurroundings : public testing::WithParamInterface<std::tuple<Listed, Tree>>,
+                           public FileSurroundings
 {
   protected:
-    RevertSurroundings() : FileSurroundings(GetParam() == Listed::ObstacleAndSibling)
+    RevertSurroundings()
+        : FileSurroundings(std::get<Listed>(GetParam()) == Listed::ObstacleAndSibling,
+                           std::get<Tree>(GetParam()))
     {
     }
 };
 
 TEST_P(RevertSurroundings, LoseNothingThatGitKeepsAndOtherwiseDifferByRuleOnly)
 {
-    checkReverts(GetParam() == Listed::OtherFile ? "revert of another file" : "revert", GetParam(),
-                 "other", allPlaces(), allObstacles());
+    const Listed listed = std::get<Listed>(GetParam());
+    checkReverts(listed == Listed::OtherFile ? "revert of another file" : "revert", listed, "other",
+                 allPlaces(), allObstacles());
 }
 
-INSTANTIATE_TEST_SUITE_P(Lists, RevertSurroundings,
-                         testing::Values(Listed::Obstacle, Listed::OtherFile,
-                                         Listed::ObstacleAndSibling),
-                         testing::PrintToStringParamName());
+INSTANTIATE_TEST_SUITE_P(Lists, RevertSurroundings, allLists, nameOfList);
 
 } // namespace

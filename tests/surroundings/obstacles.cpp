@@ -39,10 +39,10 @@ void clear(const GitRepository &copy, const std::string &path)
     fs::create_directories((copy / path).parent_path());
 }
 
-void append(const GitRepository &copy, const std::string &file, const std::string &line)
+void append(const fs::path &file, const std::string &line)
 {
-    fs::create_directories((copy / file).parent_path());
-    std::ofstream(copy / file, std::ios::app) << line << '\n';
+    fs::create_directories(file.parent_path());
+    std::ofstream(file, std::ios::app) << line << '\n';
 }
 
 void write(const GitRepository &copy, const std::string &path)
@@ -110,7 +110,7 @@ void makeRepository(const GitRepository &copy, const std::string &path)
 
 void ignore(const GitRepository &copy, const std::string &path)
 {
-    append(copy, ".git/info/exclude", '/' + path);
+    append(copy.sharedGitFolder() / "info/exclude", '/' + path);
 }
 
 Put ignored(const Put &make, const std::string &below = "")
@@ -198,8 +198,8 @@ void mark(const GitRepository &copy, const std::string &path, std::uint16_t flag
 
 void leaveOut(const GitRepository &copy, const std::string &path)
 {
-    append(copy, ".git/config", "[core]\n\tsparseCheckout = true");
-    append(copy, ".git/info/sparse-checkout", "/*\n!/" + path);
+    append(copy.sharedGitFolder() / "config", "[core]\n\tsparseCheckout = true");
+    append(copy.gitFolder() / "info/sparse-checkout", "/*\n!/" + path);
     mark(copy, path, 0, GIT_INDEX_ENTRY_SKIP_WORKTREE);
 }
 

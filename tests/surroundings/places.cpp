@@ -72,6 +72,15 @@ void copyFiles(const fs::path &from, const fs::path &to)
     fs::copy(from, to, fs::copy_options::recursive | fs::copy_options::copy_symlinks);
 }
 
+/// Lets a linked "copy" and its "main" find each other, by absolute paths as git writes them.
+void connectCopy(const fs::path &folder)
+{
+    const fs::path ownFolder = folder / "main/.git/worktrees/copy";
+    const GitRepository copy(folder / "copy");
+    copy.write(".git", "gitdir: " + ownFolder.string() + '\n');
+    copy.write((ownFolder / "gitdir").string(), (folder / "copy/.git").string() + '\n');
+}
+
 } // namespace
 
 const std::vector<Place> &allPlaces()
@@ -121,10 +130,21 @@ std::string siblingOf(const std::string &path)
     return path + "-b";
 }
 
+void linkSurroundings(const fs::path &folder)
+{
+    fs::rename(folder / "copy", folder / "main");
+    const GitRepository main(folder / "main");
+    main.git({"switch", "--quiet", "--detach"});
+    main.git({"worktree", "add", "--quiet", "../copy", "main"});
+    GitRepository(folder / "copy").git({"submodule", "--quiet", "update", "--init"});
+}
+
 void copySurroundings(const fs::path &from, const fs::path &to)
 {
     fs::create_directories(to);
     copyFiles(from, to);
+    if (fs::exists(to / "main"))
+        connectCopy(to);
 }
 
 void clearSurroundings(const fs::path &original, const fs::path &folder)
@@ -135,13 +155,13 @@ void clearSurroundings(const fs::path &original, const fs::path &folder)
     for (const auto &entry : fs::directory_iterator(original / "copy"))
         if (entry.path().filename() != ".git")
             copyFiles(entry.path(), folder / "copy" / entry.path().filename());
-    fs::copy_file(original / "copy/.git/index", folder / "copy/.git/index",
-                  fs::copy_options::overwrite_existing);
-    const fs::path repositories = "copy/.git/modules";
-    if (fs::exists(original / repositories))
+    const fs::path from = GitRepository(original / "copy").gitFolder();
+    const fs::path to = GitRepository(folder / "copy").gitFolder();
+    fs::copy_file(from / "index", to / "index", fs::copy_options::overwrite_existing);
+    if (fs::exists(from / "modules"))
     {
-        fs::remove_all(folder / repositories);
-        copyFiles(original / repositories, folder / repositories);
+        fs::remove_all(to / "modules");
+        copyFiles(from / "modules", to / "modules");
     }
 }
 

@@ -23,7 +23,7 @@ void leaveAsItIs(const GitRepository & /*copy*/, const std::string & /*path*/)
 void embed(const GitRepository &copy, const std::string &path)
 {
     copy.remove(path + "/.git");
-    fs::rename(copy / (".git/modules/" + path), copy / (path + "/.git"));
+    fs::rename(copy.gitFolder() / "modules" / path, copy / (path + "/.git"));
     copy.git({"config", "--file", path + "/.git/config", "--unset", "core.worktree"});
 }
 
@@ -132,7 +132,7 @@ void leaveSubmoduleWithCommit(const GitRepository &copy, const std::string &path
 void leaveIgnoredSubmodule(const GitRepository &copy, const std::string &path)
 {
     leaveSubmodule(copy, path);
-    copy.write(".git/info/exclude", '/' + path + '\n');
+    copy.write((copy.sharedGitFolder() / "info/exclude").string(), '/' + path + '\n');
 }
 
 } // namespace
