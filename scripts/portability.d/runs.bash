@@ -1,6 +1,6 @@
 # shellcheck shell=bash
 # SPDX-License-Identifier: MIT
-# The table of runs in docs/portability.md, which scripts/portability writes.
+# The tables of runs in docs/portability.md, which scripts/portability and scripts/places write.
 
 # commit_of FOLDER: the abbreviated id of HEAD, with a plus sign if a tracked file differs from it. The
 # table itself, which each run changes, is not looked at.
@@ -38,20 +38,21 @@ program_result()
         END { if (all == "" || passed == "") exit 1; print passed " of " all " cases" }' "$1"
 }
 
-# record DOCUMENT SYSTEM TESTS COMMIT RESULT: a line with today's date below the other lines of this
-# system, in place of the line of these tests. SYSTEM has the first columns, separated by " | ".
+# record DOCUMENT SYSTEM TESTS COMMIT RESULT [TABLE]: a line with today's date below the other lines of this
+# system, in place of the line of these tests. SYSTEM and TESTS have columns, separated by " | ". The
+# TABLE, "runs" or another word, has a comment at its end.
 record()
 {
-    local document=$1 key="| $2 | $3 |" new
-    if ! grep -qxF '<!-- end of runs -->' "$document"; then
-        echo "$document has no place for runs" >&2
+    local document=$1 key="| $2 | $3 |" end="<!-- end of ${6-runs} -->" new
+    if ! grep -qxF -- "$end" "$document"; then
+        echo "$document has no place for ${6-runs}" >&2
         return 1
     fi
-    new=$(awk -v on="| $2 |" -v key="$key" -v line="$key $(date +%F) | $4 | $5 |" '
+    new=$(awk -v on="| $2 |" -v key="$key" -v line="$key $(date +%F) | $4 | $5 |" -v mark="$end" '
         index($0, key) == 1 { next }
         { lines[++count] = $0 }
         index($0, on) == 1 { last = count }
-        $0 == "<!-- end of runs -->" { end = count - 1 }
+        $0 == mark { end = count - 1 }
         END {
             if (last == 0) last = end
             for (i = 1; i <= count; ++i) {

@@ -90,6 +90,17 @@ is 'a second run' "| Owl 12 | gcc 1 | 1.5 | 1.7 | git | $today | $head | 4 of 4 
 | Owl 12 | gcc 1 | 1.5 | 1.74 | unit | $today | $head | 5 of 5 |
 <!-- end of runs -->" sed -n '3,/end of runs/p' "$page"
 is 'text around' $'before\nafter \\n' sed '2,/end of runs/d' "$page"
+record "$page" 'Owl 12 | 1.5' 'xfs | steps' "$head" '15, as with git' places 2>"$log" && failures=$((failures + 1))
+is 'a table that is missing' "$page has no place for places" cat "$log"
+printf '%s\n' '| Owl 12 | 1.5 | xfs | steps | never | 0 | 0 |' '<!-- end of places -->' >>"$page"
+record "$page" 'Owl 12 | 1.5' 'xfs | steps' "$head" '15, as with git' places
+record "$page" 'Owl 12 | 1.5' 'xfs | surroundings' "$head" '7 of 7 cases' places
+record "$page" 'Owl 13 | 1.9' 'xfs | steps' "$head" '15, 1 listed difference' places
+is 'another table' "after \\n
+| Owl 12 | 1.5 | xfs | steps | $today | $head | 15, as with git |
+| Owl 12 | 1.5 | xfs | surroundings | $today | $head | 7 of 7 cases |
+| Owl 13 | 1.9 | xfs | steps | $today | $head | 15, 1 listed difference |
+<!-- end of places -->" sed '1,/end of runs/d' "$page"
 cp owl other
 fails 'a page without a place' record other 'Owl 12' unit "$head" '1 of 1'
 is 'such a page' owl cat other
