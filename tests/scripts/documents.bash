@@ -83,10 +83,12 @@ reads crashes '300 kills, 281 of them inside an operation; 200 commits kept, not
 commit: killed inside 28, of these left a lock 24, a merge 0
 300 kills, 281 of them inside; 200 commits kept, 111 times locks removed
 END_OF_LOG
-reads situations '1,300 situations, and 33 more with a similar name beside them; nothing lost' <<'END_OF_LOG'
+reads situations '1,300 situations, 33 more with a similar name beside them, and 240 in a linked working tree; nothing lost' <<'END_OF_LOG'
 1000 situations of merge
 300 situations of switch
 33 situations of merge beside siblings
+200 situations of merge in a linked tree
+40 situations of merge beside siblings in a linked tree
 END_OF_LOG
 reads sequences '1,000 sequences; nothing lost' <<'END_OF_LOG'
 seeds 0 to 499
