@@ -124,21 +124,21 @@ void CheckoutWatch::lookBeforeSwitch(const git_object *target)
 
 Finding CheckoutWatch::judgeSwitch(WorkingCopy &copy, const TreeChange &change)
 {
-    Finding found = ask(switchRules, copy, change);
     const bool isOther = !staysFile(change);
-    if (!found && isOther)
+    if (Finding found = ask(switchRules, copy, change))
     {
-        found = ask(otherSwitchRules, copy, change);
+        return found;
     }
-    if (!found && !isForced_)
+    if (Finding found = isOther ? ask(otherSwitchRules, copy, change) : Finding())
     {
-        found = ask(unforcedRules, copy, change);
+        return found;
     }
-    if (!found && isOther && switched_.note(copy, change) && isForced_)
+    if (Finding found = isForced_ ? Finding() : ask(unforcedRules, copy, change))
     {
-        found = inTheWay(change.path, Standing::Folder);
+        return found;
     }
-    return found;
+    const bool isInTheWay = isOther && switched_.note(copy, change) && isForced_;
+    return isInTheWay ? inTheWay(change.path, Standing::Folder) : Finding();
 }
 
 void CheckoutWatch::lookBeforeMerge(const git_oid *theirs)

@@ -117,7 +117,7 @@ bool WorkingCopy::hasSiblingBeforeFolder(const std::string &folder) const
     return isFound || !isRead;
 }
 
-const WorkingCopy::Way &WorkingCopy::wayTo(const std::string &name)
+const WorkingCopy::Way &WorkingCopy::wayTo(const std::string &name, bool isInHead)
 {
     // Names come in the order of folders.
     if (wayToFolder_ != nullptr && isDirectlyIn(folder_, name))
@@ -131,11 +131,11 @@ const WorkingCopy::Way &WorkingCopy::wayTo(const std::string &name)
     }
     folder_.assign(name, 0, end);
     wayToFolder_ = nullptr;
-    wayToFolder_ = &findWay(name);
+    wayToFolder_ = &findWay(name, isInHead);
     return *wayToFolder_;
 }
 
-const WorkingCopy::Way &WorkingCopy::findWay(const std::string &name)
+const WorkingCopy::Way &WorkingCopy::findWay(const std::string &name, bool isInHead)
 {
     const auto known = ways_.find(folder_);
     if (known != ways_.end())
@@ -148,7 +148,7 @@ const WorkingCopy::Way &WorkingCopy::findWay(const std::string &name)
         const auto [place, isNew] = ways_.try_emplace(name.substr(0, next));
         if (isNew)
         {
-            place->second = wayInto(place->first, *way);
+            place->second = wayInto(place->first, *way, isInHead);
         }
         way = &place->second;
     }
@@ -165,7 +165,8 @@ void WorkingCopy::forget()
     isKnown_ = false;
 }
 
-WorkingCopy::Way WorkingCopy::wayInto(const std::string &folder, const Way &above) const
+WorkingCopy::Way WorkingCopy::wayInto(const std::string &folder, const Way &above,
+                                      bool isInHead) const
 {
     if (above.standing != Standing::Folder || !above.blocker.empty())
     {
@@ -176,7 +177,7 @@ WorkingCopy::Way WorkingCopy::wayInto(const std::string &folder, const Way &abov
     {
         return {standing, ""};
     }
-    const git_object_t type = typeInHead(folder);
+    const git_object_t type = isInHead ? GIT_OBJECT_TREE : typeInHead(folder);
     const bool isReplaced = type == GIT_OBJECT_BLOB || type == GIT_OBJECT_COMMIT;
     if (standing == Standing::Folder)
     {

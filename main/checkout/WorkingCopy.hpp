@@ -70,7 +70,8 @@ class WorkingCopy
         std::string blocker;
     };
     /// Returns what is above a name. Remembers the folders that it has seen.
-    const Way &wayTo(const std::string &name);
+    /// @param isInHead true if HEAD is known to have the name: its folders are not looked up then
+    const Way &wayTo(const std::string &name, bool isInHead = false);
 
     /// Returns the index's entry, null if there is none without a conflict. Remembers the last one,
     /// since several rules ask for it.
@@ -132,8 +133,8 @@ class WorkingCopy
     const std::string &pathOf(const std::string &name);
     const git_index_entry *findEntry(const char *name);
     git_object_t typeInHead(const std::string &name) const;
-    const Way &findWay(const std::string &name);
-    Way wayInto(const std::string &folder, const Way &above) const;
+    const Way &findWay(const std::string &name, bool isInHead);
+    Way wayInto(const std::string &folder, const Way &above, bool isInHead) const;
     bool runsFilter(const std::string &filter);
     git_oid idOf(const std::string &name, Standing standing) const;
     git_oid idOfFile(const std::string &name, const std::string &nameForFilters) const;

@@ -35,7 +35,7 @@ bool isLink(const git_tree_entry *entry)
 
 Finding findBlockedWay(WorkingCopy &copy, const TreeChange &change)
 {
-    const WorkingCopy::Way &way = copy.wayTo(change.path);
+    const WorkingCopy::Way &way = copy.wayTo(change.path, change.before != nullptr);
     return way.blocker.empty() ? Finding() : inTheWay(way.blocker, way.standing);
 }
 
