@@ -30,7 +30,8 @@ namespace vclink::git
 /// added text names the lock. A merge gives the lock up once, after its files and index are written
 /// and before its commit, and then waits up to a second for it. If another process has locked a
 /// reference, an operation tries again for `core.filesRefLockTimeout` milliseconds: 100 by default,
-/// one minute if negative.
+/// one minute if negative. Both also refuse the patterns and settings that the adapter's operations
+/// refuse: see @ref adapter_common.
 class VCLINK_GIT_EXPORT BranchManager
 {
   public:
@@ -77,14 +78,14 @@ class VCLINK_GIT_EXPORT BranchManager
     /// other codes, if another working tree of the repository has the branch checked out
     /// (GIT_ERROR), if HEAD is a symbolic link or cannot be written (GIT_ERROR), or if HEAD or the
     /// branch moves during the switch (GIT_EMODIFIED).
-    /// Throws with GIT_EAMBIGUOUS if a tag has the name of the branch and another commit, and for
-    /// the branch "stash" if there is a stash.
+    /// Throws with GIT_EAMBIGUOUS if libgit2 finds another commit by the branch's name, for example
+    /// that of a tag or a stash.
     ///
-    /// After a failure or a cancellation HEAD is unchanged. The files are too, unless one of them,
-    /// the index, or HEAD itself, could not be written, or another process moved or deleted the
-    /// branch while they were written: then files and index are those of the branch as it was
-    /// before, and the next commit would record them on the old branch. git_branch_lookup,
-    /// git_revparse_single, git_checkout_tree, git_repository_set_head.
+    /// After a failure or a cancellation HEAD is unchanged. The files are unchanged too, unless a
+    /// file, the index or HEAD could not be written, or another process moved or deleted the branch
+    /// while the files were written. Then some or all files are those of the branch, and the next
+    /// commit would record them on the old branch. git_branch_lookup, git_revparse_single,
+    /// git_checkout_tree, git_repository_set_head.
     /// @param name the short name
     /// @throws LibGit2Exception with code GIT_ECONFLICT and class GIT_ERROR_CHECKOUT if it refuses
     /// because of files or an operation under way
@@ -119,7 +120,8 @@ class VCLINK_GIT_EXPORT BranchManager
     /// - if a symbolic link, FIFO, socket or device is in the way.
     ///
     /// The merge drivers may have run by then. docs/limitations.md has more cases. The added text
-    /// names the first such file, or only libgit2's number of them if the merge changes it too.
+    /// names the first such file. If the merge changes that file too, the text has only the number
+    /// of such files.
     ///
     /// Restores missing files and overwrites ignored ones. Keeps the folders of submodules; the
     /// merge commit records the submodules' commits as merged, whatever is checked out in them.

@@ -38,6 +38,11 @@ namespace vclink::git
 /// with the code GIT_ELOCKED and the lock's name, and change nothing. The library never removes a
 /// lock of others.
 ///
+/// Operations on files refuse a `.gitignore` or `.git/info/exclude` with a line at which libgit2
+/// would end the process or never end. Additions, commits and reverts also refuse values of
+/// core.autocrlf, core.safecrlf, core.eol and core.logAllRefUpdates that libgit2 cannot read. The
+/// text names the line or the setting.
+///
 /// @section adapter_getFileStates getFileStates
 /// Returns the states of the listed files, with one walk for the whole list. Files that Git
 /// ignores, and files that neither exist nor are known to Git, are not in the result. An empty list
@@ -80,9 +85,11 @@ namespace vclink::git
 /// the commit fail. If another process has locked the branch, the commit tries again for
 /// `core.filesRefLockTimeout` milliseconds, 100 by default.
 ///
-/// A commit refuses in three cases; nothing has changed then, and the text describes what to do:
-/// - It would conclude a merge whose process was killed. The class is GIT_ERROR_MERGE.
-/// - It would end a merge or rebase for which git has put changes aside (`--autostash`).
+/// A commit refuses in these cases; nothing has changed then, and the text describes what to do:
+/// - It would conclude a merge whose process was killed, or whose MERGE_HEAD is damaged. The class
+///   is GIT_ERROR_MERGE.
+/// - It would end a merge, squash or rebase for which git has put changes aside (`--autostash`).
+/// - `git rebase` has stopped at a merge.
 /// - `core.ignorecase` is set, and the index has another name that differs from that of a changed
 ///   file only in case.
 ///
@@ -103,8 +110,8 @@ namespace vclink::git
 /// Reports progress. Throws vclink::util::exception::CancelledOperationException if the application
 /// requests it before the first file is written; then the index entries of the files are those of
 /// HEAD, and the files are untouched, except that a socket or device in their place is gone. After
-/// any other failure of the checkout some files may be
-/// restored. git_reset_default, git_checkout_index.
+/// any other failure of the checkout some files may be restored. git_reset_default,
+/// git_checkout_index.
 ///
 /// @section adapter_getRootFolder getRootFolder
 /// Returns the root as the host specified it. Opens nothing.

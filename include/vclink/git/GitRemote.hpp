@@ -61,12 +61,13 @@ class VCLINK_GIT_EXPORT GitRemote
     /// (GIT_ENOTFOUND), if a tag would be replaced without a '+' (GIT_EEXISTS), or if a branch, or
     /// another reference such as one to notes, would lose commits without a '+', for example in a
     /// shallow repository (GIT_ENONFASTFORWARD). Does not protect remote-tracking branches. Throws
-    /// before anything is downloaded if libgit2 would remove .git/shallow, as 1.7 and later do if
-    /// the remote is on this machine (GIT_ERROR).
+    /// before anything is downloaded if libgit2 would remove .git/shallow (GIT_ERROR): 1.7 and 1.8
+    /// always do, later releases if the remote is on this machine.
     ///
     /// **Moves a branch even if a working tree has it checked out**, unlike git. The files and the
-    /// index stay, so the next commit undoes what the branch got; with '+' local commits may be in
-    /// the reflog only. Check the targets of given and configured refspecs before the call.
+    /// index stay, so the next commit undoes what the branch got. With '+' commits of the branch
+    /// can be lost: only the reflog has them. Check the targets of given and configured refspecs
+    /// before the call.
     ///
     /// After a failure or a cancellation some objects may have been downloaded and some references
     /// moved. A cancellation request that ended a fetch also stops the next checkout of the adapter
