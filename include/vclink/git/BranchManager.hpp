@@ -50,7 +50,7 @@ class VCLINK_GIT_EXPORT BranchManager
 
     /// Returns the full names of the local branches, beginning with "refs/heads/", in libgit2's
     /// order. Those that libgit2 leaves out because of a broken link below `refs/` come last.
-    /// Throws if symbolic links there lead back to folders that contain them in two ways: the list
+    /// Throws if two symbolic links there lead back to folders that contain them, because the list
     /// would have no end. git_branch_next.
     virtual std::vector<BranchPointer> getLocalBranches() const = 0;
     /// Returns the full names of the remote-tracking branches, beginning with "refs/remotes/", in
@@ -78,8 +78,8 @@ class VCLINK_GIT_EXPORT BranchManager
     /// other codes, if another working tree of the repository has the branch checked out
     /// (GIT_ERROR), if HEAD is a symbolic link or cannot be written (GIT_ERROR), or if HEAD or the
     /// branch moves during the switch (GIT_EMODIFIED).
-    /// Throws with GIT_EAMBIGUOUS if libgit2 finds another commit by the branch's name, for example
-    /// that of a tag or a stash.
+    /// Throws with GIT_EAMBIGUOUS if libgit2 finds something else by the branch's name, for example
+    /// a tag of another commit, or a stash.
     ///
     /// After a failure or a cancellation HEAD is unchanged. The files are unchanged too, unless a
     /// file, the index or HEAD could not be written, or another process moved or deleted the branch
