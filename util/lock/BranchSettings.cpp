@@ -246,6 +246,7 @@ void BranchSettings::remove()
 {
     if (lock_ != nullptr)
     {
+        // libgit2 lets go of the file even if the commit fails.
         lock_.get_deleter().file = nullptr;
         check(git_transaction_commit, lock_.get());
     }
