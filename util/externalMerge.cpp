@@ -4,7 +4,7 @@
 #include <array>
 #include <cstdio>
 #include <cstring>
-#include <iterator>
+#include <ios>
 #include <map>
 #include <vector>
 
@@ -91,8 +91,16 @@ std::vector<char> readFile(const upath &file)
     refuseObstacle(file);
     fl::filesystem::basic_ifstream<char> stream(file.string(),
                                                 std::ios_base::in | std::ios_base::binary);
-    return std::vector<char>(std::istreambuf_iterator<char>(stream),
-                             std::istreambuf_iterator<char>());
+    constexpr std::streamsize blockSize = 65536;
+    std::vector<char> content;
+    std::array<char, blockSize> block;
+    std::streamsize count = 0;
+    do
+    {
+        count = stream.rdbuf()->sgetn(block.data(), blockSize);
+        content.insert(content.end(), block.data(), block.data() + count);
+    } while (count == blockSize);
+    return content;
 }
 
 } // namespace
