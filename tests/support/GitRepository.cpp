@@ -2,8 +2,8 @@
 #include "support/GitRepository.hpp"
 
 #include <fstream>
-#include <iterator>
 #include <map>
+#include <sstream>
 #include <stdexcept>
 #include <utility>
 
@@ -33,7 +33,12 @@ std::string readOrThrow(const std::filesystem::path &file)
     std::ifstream stream(file, std::ios::binary);
     if (!stream)
         throw std::runtime_error("can't read " + file.string());
-    return {std::istreambuf_iterator<char>(stream), {}};
+    std::ostringstream content;
+    content << stream.rdbuf();
+    // A folder opens, but cannot be read.
+    if (content.bad())
+        throw std::runtime_error("can't read " + file.string());
+    return content.str();
 }
 
 void writeFile(const std::filesystem::path &file, const std::string &bytes)

@@ -3,7 +3,7 @@
 
 #include <filesystem>
 #include <fstream>
-#include <iterator>
+#include <sstream>
 #include <string>
 
 namespace vclink::test
@@ -13,7 +13,9 @@ namespace vclink::test
 inline std::string readFile(const std::filesystem::path &file)
 {
     std::ifstream stream(file, std::ios::binary);
-    return {std::istreambuf_iterator<char>(stream), {}};
+    std::ostringstream content;
+    content << stream.rdbuf();
+    return content.str();
 }
 
 } // namespace vclink::test
