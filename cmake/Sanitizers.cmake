@@ -9,6 +9,12 @@ if(VCLINK_SANITIZE)
     target_compile_options(vclink_instrumentation INTERFACE
         -fsanitize=${sanitizers} -fno-sanitize-recover=all -fno-omit-frame-pointer)
     target_link_options(vclink_linked_instrumentation INTERFACE -fsanitize=${sanitizers})
+    # UBSan's tables of source lines take a third of a program. At a fixed address their hundreds of thousands of
+    # pointers need no relocation, which takes a sixth of the time of a short program.
+    if("undefined" IN_LIST VCLINK_SANITIZE)
+        target_link_options(vclink_linked_instrumentation INTERFACE
+            $<$<STREQUAL:$<TARGET_PROPERTY:TYPE>,EXECUTABLE>:-no-pie>)
+    endif()
 endif()
 
 # Coverage and recording instrument only the library's objects.
