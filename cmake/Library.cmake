@@ -12,6 +12,9 @@ function(vclink_add_layer_objects target)
     target_compile_options(${target} PRIVATE $<$<CONFIG:RelWithDebInfo>:-g2>)
     if(NOT VCLINK_UNITY_LAYERS)
         set_target_properties(${target} PROPERTIES UNITY_BUILD OFF)
+    else()
+        # Each unit has its own copy of what the headers define, and of the sanitizers' tables for it.
+        set_target_properties(${target} PROPERTIES UNITY_BUILD_BATCH_SIZE 36)
     endif()
 endfunction()
 
