@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: MIT
+#include <chrono>
 #include <filesystem>
 #include <fstream>
 #include <iterator>
@@ -24,7 +25,8 @@ std::map<std::string, std::string> photograph(const fs::path &folder)
     {
         const auto time = entry.is_symlink() ? fs::file_time_type() : entry.last_write_time();
         std::string &seen = entries[entry.path().string()];
-        seen = std::to_string(time.time_since_epoch().count()) + '\n';
+        const std::chrono::nanoseconds sinceEpoch = time.time_since_epoch();
+        seen = std::to_string(sinceEpoch.count()) + '\n';
         if (entry.is_regular_file())
         {
             std::ifstream stream(entry.path(), std::ios::binary);

@@ -1,7 +1,6 @@
 // SPDX-License-Identifier: MIT
 #include "vclink/git/GitWorkingCopyGenerator.hpp"
 
-#include <functional>
 #include <memory>
 #include <stdexcept>
 #include <string>
@@ -28,8 +27,6 @@ using namespace vclink::test;
 
 using Generator = git::GitWorkingCopyGenerator;
 static_assert(std::is_base_of_v<vclink::WorkingCopyGenerator, Generator>);
-static_assert(sizeof(Generator) ==
-              sizeof(void *) + sizeof(std::unique_ptr<int, std::function<void(int *)>>));
 static_assert(!std::is_copy_constructible_v<Generator> && !std::is_copy_assignable_v<Generator>);
 
 const std::string generateSignature =
