@@ -5,11 +5,10 @@
 
 #include <git2/buffer.h>
 #include <git2/config.h>
-#include <git2/deprecated.h> // LIBGIT2_VER_MAJOR, of which 1.8 has made another name
-#include <git2/version.h>
 
 #include "error/errorUtil/GitResult.hpp"
 #include "error/errorUtil/gitString.hpp"
+#include "error/errorUtil/libgit2Release.hpp"
 #include "fl/i18n/convert.hpp"
 #include "main/toolCommands.hpp"
 #include "scl/core/memory/make_unique_incomplete.hpp"
@@ -23,8 +22,7 @@ namespace
 
 /// If a file can no longer be read or parsed, a look-up frees an entry that it has not found, which
 /// ends the process.
-constexpr bool endsAtBrokenFiles = LIBGIT2_VER_MAJOR > 1 ||
-                                   (LIBGIT2_VER_MAJOR == 1 && LIBGIT2_VER_MINOR >= 9);
+constexpr bool endsAtBrokenFiles = isLibGit2Since(1, 9);
 
 /// A buffer that libgit2 fills.
 class Buffer

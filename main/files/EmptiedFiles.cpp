@@ -5,9 +5,9 @@
 
 #include <git2/index.h>
 #include <git2/repository.h>
-#include <git2/version.h>
 
 #include "error/errorUtil/GitResult.hpp"
+#include "error/errorUtil/libgit2Release.hpp"
 #include "util/path/foldersAbove.hpp"
 #include "util/repository/objectIds.hpp"
 
@@ -16,7 +16,7 @@ namespace vclink::git
 namespace
 {
 
-constexpr bool endsAtEmptiedFiles = LIBGIT2_VER_MAJOR == 1 && LIBGIT2_VER_MINOR < 6;
+constexpr bool endsAtEmptiedFiles = !isLibGit2Since(1, 6);
 
 /// Whether libgit2 would fail at the empty file, or leave the mark of `git add --intent-to-add`.
 bool isLeft(git_index *index, const ChangedFile &file)

@@ -7,12 +7,11 @@
 #include <string>
 #include <vector>
 
-#include <git2/deprecated.h> // LIBGIT2_VER_MAJOR, of which 1.8 has made another name
 #include <git2/errors.h>
 #include <git2/object.h>
-#include <git2/version.h>
 
 #include "error/errorUtil/GitResult.hpp"
+#include "error/errorUtil/libgit2Release.hpp"
 #include "error/errorUtil/raiseGitError.hpp"
 #include "main/remote/Refspec.hpp"
 #include "main/remote/fetchMoves.hpp"
@@ -29,9 +28,8 @@ namespace
 /// The transport for repositories on this machine does not know where the history of a shallow
 /// repository ends, and the download writes that down: .git/shallow is gone after it. The releases
 /// before 1.9 lose it with each transport.
-constexpr bool losesEndOfHistory = LIBGIT2_VER_MAJOR > 1 ||
-                                   (LIBGIT2_VER_MAJOR == 1 && LIBGIT2_VER_MINOR >= 7);
-constexpr bool losesItOverNetwork = LIBGIT2_VER_MAJOR == 1 && LIBGIT2_VER_MINOR < 9;
+constexpr bool losesEndOfHistory = isLibGit2Since(1, 7);
+constexpr bool losesItOverNetwork = !isLibGit2Since(1, 9);
 
 void refuseLossOfShallow(const git_remote *remote)
 {

@@ -12,17 +12,16 @@
 
 #include <fcntl.h>
 #include <git2/config.h>
-#include <git2/deprecated.h> // LIBGIT2_VER_MAJOR, of which 1.8 has made another name
 #include <git2/errors.h>
 #include <git2/repository.h>
 #include <git2/sys/repository.h>
 #include <git2/transaction.h>
-#include <git2/version.h>
 #include <unistd.h>
 
 #include "error/errorUtil/GitResult.hpp"
 #include "error/errorUtil/callbackException.hpp"
 #include "error/errorUtil/libgit2Errors.hpp"
+#include "error/errorUtil/libgit2Release.hpp"
 #include "error/errorUtil/raiseGitError.hpp"
 #include "util/scope/wholeFile.hpp"
 
@@ -32,7 +31,7 @@ namespace
 {
 
 /// A lock that is not committed closes the configuration as well, before libgit2 1.8.
-constexpr bool closesLockedFile = LIBGIT2_VER_MAJOR == 1 && LIBGIT2_VER_MINOR < 8;
+constexpr bool closesLockedFile = !isLibGit2Since(1, 8);
 
 std::string pathOfConfiguration(git_repository *repository)
 {
