@@ -38,6 +38,11 @@ bool Refspec::isPattern() const noexcept
     return target.find('*') != std::string::npos;
 }
 
+bool Refspec::isNegative() const noexcept
+{
+    return isIn("^", source);
+}
+
 bool Refspec::canReach(std::string_view folder) const noexcept
 {
     const std::string_view fixed = std::string_view(target).substr(0, target.find('*'));

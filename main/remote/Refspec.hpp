@@ -31,6 +31,8 @@ struct Refspec
     bool isForced = false;
 
     bool isPattern() const noexcept;
+    /// Returns true if it excludes what its source names, e.g. "^refs/heads/x".
+    bool isNegative() const noexcept;
     /// Returns true if a target of this refspec can be in the folder.
     bool canReach(std::string_view folder) const noexcept;
     /// Returns the target for a reference of the source's side; nothing if the refspec does not

@@ -42,6 +42,20 @@ void refuseLossOfShallow(const git_remote *remote)
     }
 }
 
+/// libgit2 since 1.9 accepts them, and leaves what they exclude out of the download only: it still
+/// moves and prunes the targets that other refspecs have for it. Earlier releases accept none.
+void refuseNegative(const std::vector<Refspec> &refspecs)
+{
+    const auto negative = std::find_if(refspecs.begin(), refspecs.end(),
+                                       [](const Refspec &refspec) { return refspec.isNegative(); });
+    if (negative != refspecs.end())
+    {
+        raiseGitError(GIT_ERROR, GIT_ERROR_INVALID,
+                      "libgit2 would not leave out what the refspec '" + negative->source +
+                          "' excludes: use 'git fetch'");
+    }
+}
+
 bool isPruned(const git_remote *remote, const git_fetch_options &options)
 {
     return options.prune == GIT_FETCH_PRUNE ||
@@ -165,6 +179,7 @@ void refuseFetchThatLoses(git_repository *repository, git_remote *remote,
                           const PathspecArray &refspecs, const git_fetch_options &options)
 {
     const FetchSettings settings = readFetchSettings(repository, remote, refspecs.array(), options);
+    refuseNegative(settings.active);
     if (losesEndOfHistory && settings.isShallow)
     {
         refuseLossOfShallow(remote);

@@ -18,6 +18,7 @@ namespace vclink::git
 ///   without a '+', because libgit2 cannot compare them or does not.
 /// - The repository is shallow, and the download would remove .git/shallow: then git reports the
 ///   repository as broken, and libgit2 takes commits from branches.
+/// - A refspec is negative (`^refs/heads/x`), and libgit2 would move or prune what git leaves.
 ///
 /// Asks the remote only if refspecs and settings allow one of these; the fetch on the same handle
 /// then uses the connection. Downloads the commits of such a reference to compare them.

@@ -76,6 +76,9 @@ constexpr int failureOfShallowFetch(bool isByPath)
     return isSince(1, 9) ? GIT_OK : isSince(1, 7) ? GIT_ERROR : GIT_ENOTFOUND;
 }
 
+/// A remote with a negative refspec in its configuration cannot be looked up.
+constexpr bool refusesNegativeRefspecs = !isSince(1, 9);
+
 /// Whether libgit2 reports no failure: then there is no record, or one that says so.
 inline bool isSilent()
 {

@@ -62,7 +62,8 @@ class VCLINK_GIT_EXPORT GitRemote
     /// another reference such as one to notes, would lose commits without a '+', for example in a
     /// shallow repository (GIT_ENONFASTFORWARD). Does not protect remote-tracking branches. Throws
     /// before anything is downloaded if libgit2 would remove .git/shallow (GIT_ERROR): 1.7 and 1.8
-    /// always do, later releases if the remote is on this machine.
+    /// always do, later releases if the remote is on this machine. Throws too if a refspec is
+    /// negative, e.g. "^refs/heads/main" (GIT_ERROR).
     ///
     /// **Moves a branch even if a working tree has it checked out**, unlike git. The files and the
     /// index stay, so the next commit undoes what the branch got. With '+' commits of the branch

@@ -72,6 +72,23 @@ class FetchObstacles : public RemoteFixture
         EXPECT_EQ(references(repository_), references(copy));
     }
 
+    void configure(const Refspecs &refspecs) const
+    {
+        repository_.git({"config", "--unset-all", "remote.origin.fetch"});
+        for (const auto &refspec : refspecs)
+            repository_.git({"config", "--add", "remote.origin.fetch", refspec});
+    }
+
+    /// @param all the refspecs, the second of which excludes "own"
+    void expectRefusedThoughGitKeeps(const Refspecs &given, const Refspecs &all) const
+    {
+        const auto copy = twin();
+        EXPECT_TRUE(fetchWithGit(copy, given).succeeded());
+        for (const auto *const branch : {"own", "copy"})
+            EXPECT_EQ(idOf(branch, copy), idOf(branch));
+        expectRefused(given, GIT_ERROR, GIT_ERROR_INVALID, '\'' + all.at(1) + '\'');
+    }
+
     static void writeNote(const GitRepository &repository, const std::string &words)
     {
         repository.git(
@@ -301,6 +318,32 @@ TEST_F(FetchObstacles, LeaveRemoteTrackingBranchesToLibGit2)
     repository_.git({"update-ref", tracking, "own"});
     fetch({idOf("main", author_) + ':' + tracking});
     EXPECT_EQ(idOf(tracking), idOf("main", author_));
+}
+
+/// The server has an older "own" and no "copy".
+TEST_F(FetchObstacles, KeepWhatANegativeRefspecExcludes)
+{
+    start();
+    author_.git({"push", "--quiet", "server", "HEAD~:refs/heads/own"});
+    const Refspecs all{"+refs/heads/*:refs/heads/*", "^refs/heads/own", "^refs/heads/c*"};
+    for (const auto *const prune : {"false", "true"})
+    {
+        repository_.git({"config", "fetch.prune", prune});
+        configure({"+refs/heads/*:refs/remotes/origin/*"});
+        expectRefusedThoughGitKeeps(all, all);
+        configure(all);
+        expectRefusedThoughGitKeeps({}, all);
+    }
+}
+
+TEST_F(FetchObstacles, FollowGivenRefspecsBesideANegativeOne)
+{
+    start();
+    configure({"+refs/heads/*:refs/remotes/origin/*", "^refs/heads/main"});
+    if (libgit2_release::refusesNegativeRefspecs)
+        expectRefused({"refs/heads/main"}, GIT_ERROR, GIT_ERROR_INVALID, "'^refs/heads/main'");
+    else
+        expectAsGitDoes({"refs/heads/main"});
 }
 
 /// libgit2 would give a branch the id of the tag.

@@ -69,6 +69,13 @@ TEST(Refspec, KnowsTheFoldersThatItCanReach)
             << text;
 }
 
+TEST(Refspec, IsNegativeIfItBeginsWithACircumflex)
+{
+    for (const auto *const text : {"^refs/heads/a", "+^refs/heads/*"})
+        EXPECT_TRUE(readRefspec(text, GIT_DIRECTION_FETCH).isNegative()) << text;
+    EXPECT_FALSE(readRefspec("refs/heads/^a", GIT_DIRECTION_FETCH).isNegative());
+}
+
 TEST(RemotePath, IsWhatLibGit2TakesForAFolder)
 {
     const struct
