@@ -7,9 +7,11 @@
 #include <iterator>
 #include <optional>
 #include <string>
+#include <utility>
 
 #include <git2/config.h>
 #include <git2/errors.h>
+#include <git2/object.h>
 #include <git2/remote.h>
 #include <git2/repository.h>
 #include <strings.h>
@@ -161,6 +163,44 @@ void refuseRejected(const Receiver &receiver, git_repository *repository, const 
     }
 }
 
+/// Returns true for a tree, and for a tag that leads to one, also through other tags.
+bool isTree(git_repository *repository, const std::string &source)
+{
+    auto found = revparseObject(repository, source);
+    const int code = found.has_error() ? found.error().getCode() : 0;
+    if (code == GIT_ENOTFOUND || code == GIT_EINVALIDSPEC)
+    {
+        // The push reports it.
+        return false;
+    }
+    OwnedHandle<git_object> object = std::move(found).value();
+    if (git_object_type(object.get()) == GIT_OBJECT_TAG)
+    {
+        object = acquire<git_object>(git_object_peel, object.get(), GIT_OBJECT_ANY).value();
+    }
+    return git_object_type(object.get()) == GIT_OBJECT_TREE;
+}
+
+/// libgit2 would write the tree without what is in it. A server refuses that.
+void refuseTrees(git_repository *repository, const std::string &path,
+                 const std::vector<Refspec> &refspecs)
+{
+    for (const auto &[source, target, isForced] : refspecs)
+    {
+        // A branch is always at a commit.
+        if (source.empty() || isIn(branchesFolder, source) || !isTree(repository, source))
+        {
+            continue;
+        }
+        const auto there = findId(openAt(path).get(), target);
+        if (!there || !isSameId(*there, *revparseId(source, repository)))
+        {
+            raiseRejected("the content of the tree '" + source +
+                          "' would be missing in the remote: use 'git push'");
+        }
+    }
+}
+
 } // namespace
 
 void refuseRejectedPush(git_repository *repository, const git_remote *remote,
@@ -172,6 +212,7 @@ void refuseRejectedPush(git_repository *repository, const git_remote *remote,
     {
         return;
     }
+    refuseTrees(repository, *path, refspecs);
     const bool hasTrees = mayHaveWorkingTrees(*path);
     std::vector<Refspec> suspects;
     std::copy_if(refspecs.begin(), refspecs.end(), std::back_inserter(suspects),

@@ -165,6 +165,8 @@ std::vector<Tolerance> tolerancesOfRemotes(const std::string &normal)
         // What is not there can't be lost.
         {"fetchGuarded", "git_reference_name_to_id", any, GIT_ENOTFOUND, normal},
         {"pushGuarded", "git_reference_name_to_id", any, GIT_ENOTFOUND, normal},
+        // The push itself reports what is not here.
+        {"pushGuarded", "git_revparse_single", 1, GIT_ENOTFOUND, normal},
         // Below the commits of a shallow repository there are none, for all one knows.
         {"fetchGuarded", "git_commit_lookup", any, GIT_ENOTFOUND,
          failure(GIT_ENONFASTFORWARD, GIT_ERROR_REFERENCE,

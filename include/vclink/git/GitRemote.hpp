@@ -88,10 +88,11 @@ class VCLINK_GIT_EXPORT GitRemote
     /// refspec does not begin with '+' (GIT_ENONFASTFORWARD).
     ///
     /// A repository on this machine accepts a push only if it is bare, and runs no hooks. The push
-    /// fails, too, if the repository's receive.denyDeletes or receive.denyNonFastForwards forbid
-    /// it, if one of its linked working trees has the branch checked out, or if it would delete the
-    /// current branch. **What another process pushes to the branch at the same moment can be
-    /// overwritten.** git_remote_push; for a tag before it git_remote_connect, git_remote_ls.
+    /// fails, too, if it would write a tree there, also through a tag, if the repository's
+    /// receive.denyDeletes or receive.denyNonFastForwards forbid it, if one of its linked working
+    /// trees has the branch checked out, or if it would delete the current branch. **What another
+    /// process pushes to the branch at the same moment can be overwritten.** git_remote_push; for a
+    /// tag before it git_remote_connect, git_remote_ls.
     /// @param refspecs used unchanged, with full names, e.g. "refs/heads/main:refs/heads/main";
     /// ":NAME" deletes. An empty list means the configured ones, and pushes nothing if there are
     /// none

@@ -55,6 +55,24 @@ class PushObstacles : public RemoteFixture, public testing::WithParamInterface<N
         EXPECT_THAT(failure.text, HasSubstr(words));
         EXPECT_EQ(references(server_), before);
     }
+
+    void expectRefusedThoughGitPushes(const std::string &refspec)
+    {
+        SCOPED_TRACE(refspec);
+        EXPECT_TRUE(
+            pushWithGit(server_.copyTo(folder() / "twin of the server"), {refspec}).succeeded());
+        const auto before = references(server_);
+        const auto failure = failureOf([&] { push({refspec}); });
+        EXPECT_EQ(failure.errorClass, GIT_ERROR_REFERENCE);
+        EXPECT_THAT(failure.text, HasSubstr("would be missing in the remote: use 'git push'"));
+        EXPECT_EQ(references(server_), before);
+    }
+
+    void tag(const std::string &name, const std::string &object) const
+    {
+        repository_.git(
+            {"-c", "user.name=A", "-c", "user.email=a@b", "tag", "-m", "words", name, object});
+    }
 };
 
 TEST_P(PushObstacles, GoToTheAddressForPushes)
@@ -154,6 +172,34 @@ TEST_P(PushObstacles, KeepBranchesThatAreCheckedOutInLinkedTrees)
     server_.git({"config", "receive.denyCurrentBranch", "ignore"});
     expectAsGitDoes({":refs/heads/side"}, "current branch");
     expectAsGitDoes(move, "");
+}
+
+/// libgit2 would write a tree without what is in it, and report success.
+TEST_P(PushObstacles, KeepTheRemoteWhole)
+{
+    repository_.write("folder/file", "only here\n");
+    repository_.git({"add", "."});
+    const std::string tree = repository_.line({"write-tree"});
+    repository_.git({"update-ref", "refs/tags/plain", tree});
+    tag("annotated", tree);
+    tag("nested", "annotated");
+    tag("content", repository_.line({"rev-parse", ":folder/file"}));
+    repository_.git({"commit", "--quiet", "-m", "words"});
+    tag("commit", "HEAD~");
+    for (const auto *const name : {"plain", "annotated", "nested"})
+    {
+        const std::string reference = std::string("refs/tags/") + name;
+        expectRefusedThoughGitPushes(reference);
+        expectRefusedThoughGitPushes('+' + reference + ":refs/own/" + name);
+        expectRefusedThoughGitPushes(tree + ":refs/own/" + name);
+    }
+    expectAsGitDoes({"refs/tags/content"}, "");
+    expectAsGitDoes({"refs/tags/commit"}, "");
+    server_.git(
+        {"fetch", "--quiet", repository_.path().string(), "refs/tags/nested:refs/tags/nested"});
+    expectAsGitDoes({"refs/tags/nested"}, "");
+    EXPECT_THAT(failureOf([this] { push({"refs/tags/none"}); }).text, HasSubstr("src refspec"));
+    server_.git({"fsck", "--strict"});
 }
 
 INSTANTIATE_TEST_SUITE_P(Locally, PushObstacles,

@@ -130,7 +130,8 @@ TEST_F(RemoteCalls, LookAheadOverTheSameConnection)
     };
     repository_.git({"tag", "own"});
     EXPECT_THAT(middle([this] { push({"refs/tags/own"}); }),
-                ElementsAre("git_remote_connect", "git_remote_ls", "git_remote_push"));
+                ElementsAre("git_revparse_single", "git_object_free", "git_remote_connect",
+                            "git_remote_ls", "git_remote_push"));
     repository_.git({"config", "remote.origin.tagOpt", "--tags"});
     EXPECT_THAT(middle([this] { fetch(); }),
                 ElementsAre("git_remote_connect", "git_remote_ls", "git_reference_name_to_id",
