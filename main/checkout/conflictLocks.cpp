@@ -11,6 +11,7 @@
 #include <git2/tree.h>
 
 #include "error/errorUtil/GitResult.hpp"
+#include "error/errorUtil/libgit2Release.hpp"
 #include "main/checkout/gitlinks.hpp"
 #include "main/checkout/obstaclesAhead.hpp"
 #include "util/repository/attributes.hpp"
@@ -84,7 +85,9 @@ bool isThere(WorkingCopy &copy, const std::string &path, const git_tree *theirs)
            findInTree(theirs, path) != nullptr;
 }
 
-/// git never takes an empty file for a renamed one.
+/// git never takes an empty file for a renamed one, nor does libgit2 since 1.8.
+constexpr bool takesEmptyForRenamed = !isLibGit2Since(1, 8);
+
 Obstacle takenForRenamed(const std::string &path, const std::string &other)
 {
     return {path, "one side has changed the empty file '" + path + "' and the other has deleted " +
@@ -179,7 +182,10 @@ RenamedLocks::Contents RenamedLocks::contentsOf(const std::vector<Candidate> &ca
     Contents contents;
     for (const Candidate &candidate : candidates)
     {
-        contents[rawId(candidate.before.id)].changed = candidate.before.path;
+        if (takesEmptyForRenamed || !isEmptyBlob(candidate.before.id))
+        {
+            contents[rawId(candidate.before.id)].changed = candidate.before.path;
+        }
     }
     return contents;
 }
@@ -225,7 +231,7 @@ bool RenamedLocks::isInConflict(git_repository *repository, const TreeChange &ch
 Finding RenamedLocks::findEmptied(const TreeChange &change,
                                   const std::vector<Candidate> &candidates)
 {
-    if (!isEmptyBlob(*git_tree_entry_id(change.after)))
+    if (!takesEmptyForRenamed || !isEmptyBlob(*git_tree_entry_id(change.after)))
     {
         return {};
     }

@@ -32,8 +32,8 @@ Finding findLockBesideFile(WorkingCopy &copy, const TreeChange &change, const gi
 
 /// The same rule for a file that one side has renamed and the other has changed. There it also
 /// finds folders that cannot be written to, because libgit2 removes the file and
-/// creates it again, and files that libgit2 may take for the renamed one by mistake: empty ones,
-/// and several with the same content of which one changes its last name.
+/// creates it again, and files that libgit2 may take for the renamed one by mistake: before
+/// 1.8 empty ones, and several with the same content of which one changes its last name.
 class RenamedLocks
 {
   public:

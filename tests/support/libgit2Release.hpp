@@ -79,6 +79,10 @@ constexpr int failureOfShallowFetch(bool isByPath)
 /// A remote with a negative refspec in its configuration cannot be looked up.
 constexpr bool refusesNegativeRefspecs = !isSince(1, 9);
 
+/// A merge takes an empty file for the deleted empty one under another name, and the library
+/// refuses it.
+constexpr bool takesEmptyForRenamed = !isSince(1, 8);
+
 /// Whether libgit2 reports no failure: then there is no record, or one that says so.
 inline bool isSilent()
 {
