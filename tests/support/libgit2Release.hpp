@@ -31,9 +31,6 @@ constexpr bool endsAtBrokenFiles = isSince(1, 9);
 /// GIT_CHECKOUT_SAFE. 0 is the dry run before.
 constexpr unsigned safeCheckout = isSince(1, 9) ? 0 : 1;
 
-/// An empty git_status_options has the threshold of renames that its function of libgit2 sets.
-constexpr bool setsRenameThreshold = isSince(1, 4);
-
 /// The code with which a repository of SHA-256 objects is refused.
 constexpr int refusalOfSha256 = isSince(1, 6) ? GIT_EINVALID : GIT_ERROR;
 /// The code with which a repository with extensions.worktreeConfig is refused, or 0.

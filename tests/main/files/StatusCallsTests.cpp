@@ -19,7 +19,6 @@
 #include "options/Callbacks.hpp"
 #include "support/LogCapture.hpp"
 #include "support/libgit2/LibGit2Recorder.hpp"
-#include "support/libgit2Release.hpp"
 #include "support/text.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
 
@@ -259,10 +258,7 @@ TEST_F(StatusRecord, HasTheseFieldsAndHoldsOtherwiseWhatLibGit2Initialises)
     EXPECT_EQ(options.baseline, nullptr);
     EXPECT_TRUE(walks_[0].hasCallback);
     EXPECT_TRUE(walks_[0].hasPayload);
-    if (libgit2_release::setsRenameThreshold)
-    {
-        EXPECT_EQ(options.rename_threshold, initialised.rename_threshold);
-    }
+    EXPECT_EQ(options.rename_threshold, initialised.rename_threshold);
     EXPECT_EQ(options.version, 1U);
     EXPECT_EQ(options.version, initialised.version);
     EXPECT_EQ(options.baseline, initialised.baseline);
