@@ -192,6 +192,20 @@ TEST_F(DebianPackages, HaveNothingThatDebiansPolicyRemarks)
     EXPECT_TRUE(result.succeeded()) << result.output << result.errors;
 }
 
+/// VCLINK_LIBRARY_FOLDER is only what CMake has chosen.
+TEST_F(DebianPackages, PutTheLibrariesWhereDebianLooksForThem)
+{
+    const std::string architecture =
+        runToSuccess(Command({"dpkg-architecture", "--query", "DEB_HOST_MULTIARCH"}));
+    const auto place = unpack({library, host, development, hostDevelopment}) / "usr/lib" /
+                       architecture.substr(0, architecture.find('\n'));
+    for (const auto *const name : {"libvclink_git.so", "libvclink_git.so." VCLINK_SO_VERSION,
+                                   "libvclink_host.so", "libvclink_host.so." VCLINK_SO_VERSION})
+    {
+        EXPECT_TRUE(std::filesystem::exists(place / name)) << place / name;
+    }
+}
+
 TEST_F(DebianPackages, LeaveWhatDebuggersReadToOthersThatMatch)
 {
     const auto symbols = packages(".ddeb");
