@@ -5,6 +5,7 @@
 #include <system_error>
 
 #include <CLI/CLI.hpp>
+#include <sys/resource.h>
 
 #include "Output.hpp"
 #include "Session.hpp"
@@ -89,11 +90,24 @@ std::filesystem::path withoutLinks(const std::filesystem::path &folder)
     return error ? folder : real;
 }
 
+/// The standard library opens a descriptor for each level of what it removes. On most systems a
+/// process starts with a limit of 1,024, and may raise it.
+void allowAllDescriptors()
+{
+    rlimit limit = {};
+    if (::getrlimit(RLIMIT_NOFILE, &limit) == 0)
+    {
+        limit.rlim_cur = limit.rlim_max;
+        ::setrlimit(RLIMIT_NOFILE, &limit);
+    }
+}
+
 /// libgit2 leaves what it has made if it can't even set up the repository, e.g. on a full disk, and
 /// very deep folders.
 /// @param wasThere whether the folder was there before, which was empty then
 void removeUnfinished(const std::filesystem::path &folder, bool wasThere)
 {
+    allowAllDescriptors();
     std::error_code error;
     if (wasThere)
     {

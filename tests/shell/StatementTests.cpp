@@ -6,6 +6,7 @@
 #include <gmock/gmock.h>
 
 #include "ShellMergeFixture.hpp"
+#include "support/DescriptorLimit.hpp"
 #include "support/readFile.hpp"
 
 namespace vclink::test
@@ -140,6 +141,7 @@ TEST_F(ShellStatements, ACloneThatFailsAtATreeOfThousandsOfLevelsIsRemoved)
                                           deep + "file\ndata 1\ny\n")
                                    .run();
     ASSERT_EQ(made.exitStatus, 0) << made.errors;
+    const DescriptorLimit usual(1024);
     const CommandResult result = runIn(folder().path(), {"clone", "deep", "clone"});
     EXPECT_NE(result.exitStatus, 0);
     EXPECT_THAT(result.errors, HasSubstr("File name too long"));
