@@ -121,6 +121,8 @@ class WorkingCopy
     /// Returns true if the content of the file, link or folder differs from its entry in the index.
     /// A missing file does not differ.
     bool isEdited(const git_index_entry &entry);
+    /// Returns true if the file or link has neither the content of HEAD nor of the target.
+    [[nodiscard]] bool isOfNeither(const TreeChange &change);
     /// Returns true if libgit2 cannot tell an edited file from its entry in the index or from what
     /// a checkout writes, because it compares them after the conversion of line ends or of `$Id$`.
     /// @param entry has another size than the file, which exists

@@ -117,6 +117,14 @@ bool WorkingCopy::isEdited(const git_index_entry &entry)
     return standing == Standing::Special || (standing == Standing::Folder && holdsFiles(name));
 }
 
+bool WorkingCopy::isOfNeither(const TreeChange &change)
+{
+    const git_oid id = idOf(change.path, at(change.path));
+    const auto isContentOf = [&id](const git_tree_entry *side)
+    { return side != nullptr && isSameId(id, *git_tree_entry_id(side)); };
+    return !isContentOf(change.before) && !isContentOf(change.after);
+}
+
 bool WorkingCopy::isEditHiddenByConversion(const git_index_entry &entry,
                                            const git_tree_entry *after) const
 {

@@ -63,10 +63,13 @@ Finding findOverlookedEdit(WorkingCopy &copy, const TreeChange &change)
     const bool isOfSameKind = (entry->mode & S_IFMT) == (status.st_mode & S_IFMT);
     const bool isEditOfSameSize = isAsLibGit2Sees && isOfSameKind &&
                                   !copy.isConvertedByGit(change.path) && copy.isEdited(*entry);
-    const bool isHiddenEdit = S_ISREG(status.st_mode) && isOfSameKind &&
+    // libgit2 finds this, too, except if its own hash fails: it does for a file of more than 4 GiB,
+    // and can for one that grows, or without memory or descriptors.
+    const bool isEdit = !isAsLibGit2Sees && isOfSameKind && copy.isOfNeither(change);
+    const bool isHiddenEdit = !isEdit && S_ISREG(status.st_mode) && isOfSameKind &&
                               hasOtherSizeThan(*entry, status) &&
                               copy.isEditHiddenByConversion(*entry, change.after);
-    if (isEditOfSameSize || isHiddenEdit)
+    if (isEditOfSameSize || isEdit || isHiddenEdit)
     {
         return Obstacle{change.path, "the uncommitted changes of '" + change.path +
                                          "' would be lost in the checkout"};

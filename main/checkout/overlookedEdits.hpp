@@ -11,8 +11,9 @@ namespace vclink::git
 {
 
 /// Finds a tracked file with a change that libgit2 does not see: it compares only the size and the
-/// time of the last change, and takes a file that it cannot read for an unchanged one. git also
-/// compares the inode and the time at which that changed. If the size differs, libgit2 compares the
+/// time of the last change. git also compares the inode and the time at which that changed. libgit2
+/// takes a file for unchanged if it cannot read it or compute its id: the size of one of more than
+/// 4 GiB does not fit, and one may grow meanwhile. So every change is looked for here. If the size differs, libgit2 compares the
 /// content after the conversion of line ends, and git takes the file for changed.
 /// Also finds a folder in the place of a tracked file, if the name is ignored: libgit2 would delete
 /// the folder.

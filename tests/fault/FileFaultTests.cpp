@@ -206,6 +206,55 @@ TEST_P(CommitOverFailingCall, FailsOrHoldsEveryFileAndParent)
     }
 }
 
+/// A checkout in a working copy of which every file is edited.
+class CheckoutOverFailingCall : public FailingFileCall
+{
+  protected:
+    using Edit = std::string (*)(const std::string &);
+
+    /// Makes the edit in every file.
+    /// @return what the files hold then
+    std::map<std::string, std::string> editAll(Edit edit) const
+    {
+        const GitRepository &repository = trial_.repository();
+        std::map<std::string, std::string> edited;
+        for (const std::string &name : vclink::test::split(repository.git({"ls-files"})))
+        {
+            edited[name] = edit(repository.read(name));
+            repository.write(name, edited[name]);
+        }
+        return edited;
+    }
+
+    /// Lets each call fail in turn, until there is none left.
+    void failEach(Edit edit)
+    {
+        std::string function = "the first";
+        for (int call = 1; !function.empty(); ++call)
+        {
+            const auto action = trial_.begin();
+            const std::map<std::string, std::string> edited = editAll(edit);
+            std::string outcome;
+            {
+                const FailingFiles failing(call, EMFILE);
+                outcome = outcomeOf(action);
+                function = failing.failed();
+            }
+            SCOPED_TRACE("call " + std::to_string(call) + ", " + function + ": " + outcome);
+            for (const auto &[name, content] : edited)
+                EXPECT_EQ(trial_.repository().read(name), content) << name;
+        }
+    }
+};
+
+/// libgit2 takes a file whose id it can't compute for an unchanged one.
+TEST_P(CheckoutOverFailingCall, KeepsEveryEdit)
+{
+    failEach([](const std::string &content) { return content + "mine\n"; });
+    // Of the same size.
+    failEach([](const std::string &content) { return std::string(content.size(), 'm'); });
+}
+
 /// libgit2 takes an index that it can't look at for an empty one.
 class FailingLookAtTheIndex : public FailingFileCall
 {
@@ -253,10 +302,8 @@ TEST_P(FailingLookAtTheIndex, LosesNoEntry)
 INSTANTIATE_TEST_SUITE_P(Of, FailingLookAtTheIndex, testing::ValuesIn(writingOperations()),
                          vclink::test::nameOfTest);
 
-/// Of changed files, of a working copy in which some are not checked out, and of a merge.
-std::vector<Operation> commitsOfFiles()
+std::vector<Operation> operationsOf(const std::set<std::string> &names)
 {
-    const std::set<std::string> names{"commit", "commitSparse", "commitMerge"};
     std::vector<Operation> operations = writingOperations();
     const auto others = std::remove_if(operations.begin(), operations.end(),
                                        [&names](const Operation &operation)
@@ -265,7 +312,13 @@ std::vector<Operation> commitsOfFiles()
     return operations;
 }
 
-INSTANTIATE_TEST_SUITE_P(Of, CommitOverFailingCall, testing::ValuesIn(commitsOfFiles()),
+/// Of changed files, of a working copy in which some are not checked out, and of a merge.
+INSTANTIATE_TEST_SUITE_P(Of, CommitOverFailingCall,
+                         testing::ValuesIn(operationsOf({"commit", "commitSparse", "commitMerge"})),
+                         vclink::test::nameOfTest);
+
+INSTANTIATE_TEST_SUITE_P(Of, CheckoutOverFailingCall,
+                         testing::ValuesIn(operationsOf({"switchBranch", "mergeFastForward"})),
                          vclink::test::nameOfTest);
 
 INSTANTIATE_TEST_SUITE_P(Of, FailingFileCall, testing::ValuesIn(writingOperations()),

@@ -96,15 +96,18 @@ TEST_F(SwitchBranch, KeepsChangesThatTheBranchDoesNotTouch)
 
 TEST_F(SwitchBranch, IsRefusedByWorkInItsWay)
 {
-    const std::vector<std::vector<std::string>> works{{"a"}, {"folder/new"}, {"b"}, {"a", "b"}};
-    for (const auto &names : works)
+    const auto edited = [](const std::string &name)
+    { return "the uncommitted changes of '" + name + "' would be lost in the checkout"; };
+    const std::vector<std::pair<std::vector<std::string>, std::string>> works{
+        {{"a"}, edited("a")},
+        {{"b"}, edited("b")},
+        {{"a", "b"}, edited("a")},
+        {{"folder/new"}, "1 conflict prevents checkout"}};
+    for (const auto &[names, text] : works)
     {
         for (const auto &name : names)
             repository_.write(name, "mine\n");
-        const bool isOne = names.size() == 1;
-        expectRefused("topic",
-                      {GIT_ECONFLICT, GIT_ERROR_CHECKOUT,
-                       isOne ? "1 conflict prevents checkout" : "2 conflicts prevent checkout"});
+        expectRefused("topic", {GIT_ECONFLICT, GIT_ERROR_CHECKOUT, text});
         EXPECT_FALSE(repository_.tryGit({"checkout", "--quiet", "topic"}).succeeded());
         repository_.git({"stash", "--quiet", "--include-untracked"});
     }

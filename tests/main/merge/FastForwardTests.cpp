@@ -2,6 +2,7 @@
 #include <memory>
 #include <stdexcept>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include <git2.h>
@@ -85,16 +86,21 @@ TEST_F(FastForward, IsRefusedByWorkInItsWay)
     const auto factory = std::make_shared<TestOptionsFactory>(interactor_);
     factory->checkoutOptions.checkoutStrategy = GIT_CHECKOUT_FORCE;
     git::GitAdapter forcing(asPath(repository_.path()), factory);
-    const std::vector<Change> works{writes("file", "mine\n"),
-                                    writes("file", "mine\n") + runsGit({"add", "file"}),
-                                    writes("folder/new", "mine\n"), writes("other", "mine\n")};
-    for (const auto &work : works)
+    const std::string conflict = "1 conflict prevents checkout";
+    const std::vector<std::pair<Change, std::string>> works{
+        {writes("file", "mine\n"),
+         "the uncommitted changes of 'file' would be lost in the checkout"},
+        {writes("file", "mine\n") + runsGit({"add", "file"}), conflict},
+        {writes("folder/new", "mine\n"), conflict},
+        {writes("other", "mine\n"),
+         "the uncommitted changes of 'other' would be lost in the checkout"}};
+    for (const auto &[work, text] : works)
     {
         work(repository_);
         {
             const NothingChanges nothing(repository_);
-            EXPECT_EQ(failureOfMerge("topic"), textOf(Failure{GIT_ECONFLICT, GIT_ERROR_CHECKOUT,
-                                                              "1 conflict prevents checkout"}));
+            EXPECT_EQ(failureOfMerge("topic"),
+                      textOf(Failure{GIT_ECONFLICT, GIT_ERROR_CHECKOUT, text}));
             EXPECT_THROW(git::BranchManager::create(forcing)->merge("topic"), git::GitException);
         }
         repository_.git({"reset", "--quiet", "--hard"});
