@@ -25,6 +25,7 @@
 #include "util/lock/IndexLock.hpp"
 #include "util/path/PathspecArray.hpp"
 #include "util/path/paths.hpp"
+#include "util/repository/Head.hpp"
 #include "util/repository/repository.hpp"
 #include "util/repository/settings.hpp"
 #include "vclink/git/messageIdentifiers.hpp"
@@ -133,6 +134,17 @@ void resetEntries(git_repository *repository, git_index *index, const git_object
     }
 }
 
+/// Throws the failure that has kept HEAD from being read, unless there is no commit yet. The index
+/// lacks the listed files then: a checkout would succeed and restore none of them.
+void refuseUnreadableHead(git_repository *repository,
+                          const GitResult<OwnedHandle<git_object>> &head)
+{
+    if (!head.has_value() && lookupHead(repository) != nullptr)
+    {
+        static_cast<void>(head.value());
+    }
+}
+
 } // namespace
 
 FileStateMap GitAdapter::throwIfConflicted(const std::vector<upath> &files)
@@ -179,6 +191,7 @@ void GitAdapter::revertFiles(const std::vector<upath> &files)
     }
     resetEntries(repository.get(), index.get(), head.has_value() ? head.value().get() : nullptr,
                  pathspec, states, root_);
+    refuseUnreadableHead(repository.get(), head);
     const std::shared_ptr<GitOptionsFactory> factory = optionsFactory_;
     CheckoutOptions options = factory->makeCheckoutOptions();
     options.checkoutStrategy = GIT_CHECKOUT_FORCE | GIT_CHECKOUT_RECREATE_MISSING;
@@ -186,8 +199,9 @@ void GitAdapter::revertFiles(const std::vector<upath> &files)
     record.paths = getArray(pathspec);
     // The listed files are the same in HEAD and in the index now. If libgit2 compared the two, it
     // could take one of these files for another one with the same content that is a folder in the
-    // index, and remove it.
-    record.baseline_index = head.has_value() ? index.get() : nullptr;
+    // index, and remove it. It would also remove them if another process makes the first commit
+    // now.
+    record.baseline_index = index.get();
     const CheckoutWatch watch(CheckoutKind::Revert, repository.get(), record);
     const GitResult<void> restored = call(git_checkout_index, repository.get(), nullptr, &record);
     if (watch.hasRefused())

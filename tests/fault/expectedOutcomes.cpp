@@ -230,8 +230,8 @@ std::vector<Tolerance> tolerancesOfOthers(const std::string &operation, const st
         {"", "git_config_get_mapped", any, GIT_ENOTFOUND, normal},
         // Any answer but no means that the file is listed.
         {"", "git_pathspec_matches_path", any, any, normal},
-        // Without a HEAD the files are taken out of the index.
-        {"revert", "git_revparse_single", any, any, normal},
+        // Without a commit the files are taken out of the index.
+        {"revertFilesUnborn", "git_revparse_single", any, any, normal},
         // The look for conflicts finds none.
         {"revert", "git_index_has_conflicts", any, any, normal},
         {"merge", "git_index_conflict_next", any, GIT_ITEROVER, normal},

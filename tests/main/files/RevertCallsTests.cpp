@@ -127,17 +127,61 @@ TEST_F(RevertCalls, ResetASecondTimeWhereAFileIsLostOnTheWay)
     EXPECT_THAT(calls_.openHandles(), IsEmpty());
 }
 
-TEST_F(RevertCalls, ResetToNothingWhyeverHeadFailsOrIsMissing)
+/// libgit2 would read HEAD again for the checkout, and could remove the file.
+TEST_F(RevertCalls, EndAfterTheResetToNothingIfHeadFailsOnce)
 {
-    calls_.fail({{"git_revparse_single", GIT_EAUTH}});
-    EXPECT_NO_THROW(revert({"file"}));
+    repository_.write("sub/inside", "staged");
+    repository_.add({"sub/inside"});
+    for (const int code : {GIT_EAUTH, GIT_ENOTFOUND, GIT_EUNBORNBRANCH})
+    {
+        targets_.clear();
+        RepositoryState expected = stateOf(repository_);
+        expected.index.erase("file");
+        calls_.fail({{"git_revparse_single", code}});
+        EXPECT_EQ(failureOf([this] { revert({"file"}); }),
+                  (Failure{code, GIT_ERROR_OS, "injected"}));
+        EXPECT_THAT(targets_, ElementsAre("none"));
+        EXPECT_THAT(checkoutFiles_, IsEmpty());
+        EXPECT_EQ(stateOf(repository_), expected);
+        EXPECT_THAT(calls_.openHandles(), IsEmpty());
+        calls_.fail({});
+        revert({"file"});
+        EXPECT_EQ(repository_.read("file"), "content of file\n");
+        EXPECT_EQ(repository_.git({"status", "--short"}), "M  sub/inside\n");
+        repository_.write("file", "edited");
+        checkoutFiles_.clear();
+    }
+}
+
+TEST_F(RevertCalls, EndAfterTheResetToNothingIfItIsUnknownWhetherThereIsACommit)
+{
+    repository_.git({"checkout", "--quiet", "--orphan", "fresh"});
+    calls_.fail({{"git_repository_head", GIT_EAUTH}});
+    EXPECT_EQ(failureOf([this] { revert({"file"}); }),
+              (Failure{GIT_EAUTH, GIT_ERROR_OS, "injected"}));
     EXPECT_THAT(targets_, ElementsAre("none"));
-    EXPECT_EQ(indexOf(repository_).count("file"), 0U);
-    calls_.fail({});
+    EXPECT_THAT(checkoutFiles_, IsEmpty());
+    EXPECT_EQ(repository_.read("file"), "edited");
+    EXPECT_THAT(calls_.openHandles(), IsEmpty());
+}
+
+TEST_F(RevertCalls, ResetToNothingWithoutACommit)
+{
     repository_.git({"checkout", "--quiet", "--orphan", "fresh"});
     revert({"file"});
-    EXPECT_THAT(targets_, ElementsAre("none", "none"));
-    EXPECT_THAT(checkoutFiles_, ElementsAre(ElementsAre("file"), ElementsAre("file")));
+    EXPECT_THAT(targets_, ElementsAre("none"));
+    EXPECT_THAT(checkoutFiles_, ElementsAre(ElementsAre("file")));
+    EXPECT_EQ(indexOf(repository_).count("file"), 0U);
+    EXPECT_EQ(repository_.read("file"), "edited");
+    EXPECT_THAT(calls_.openHandles(), IsEmpty());
+}
+
+TEST_F(RevertCalls, KeepTheFileIfAnotherProcessMakesTheFirstCommit)
+{
+    repository_.git({"checkout", "--quiet", "--orphan", "fresh"});
+    factory_->onCheckoutOptions = [this] { repository_.git({"update-ref", "HEAD", "main"}); };
+    revert({"file"});
+    EXPECT_EQ(repository_.read("file"), "edited");
     EXPECT_THAT(calls_.openHandles(), IsEmpty());
 }
 

@@ -59,9 +59,8 @@ TEST_F(RevertFailure, OfAHeadThatCannotBeReadLeavesTheResetInPlace)
     RepositoryState expected = stateOf(repository_);
     expected.index.erase("file");
     EXPECT_EQ(unprivilegedFailureOf([this] { revert({"file"}); }),
-              printed({GIT_ENOTFOUND, GIT_ERROR_INVALID,
-                       "the reference 'refs/heads/main' cannot be peeled - Cannot retrieve "
-                       "reference target"}));
+              printed({GIT_ENOTFOUND, GIT_ERROR_ODB,
+                       "object not found - no match for id (" + std::string(40, '1') + ")"}));
     EXPECT_EQ(stateOf(repository_), expected);
 }
 
