@@ -24,14 +24,7 @@ namespace
 {
 
 using std::chrono::microseconds;
-using vclink::test::Casualty;
-using vclink::test::Comparison;
-using vclink::test::GitFixture;
-using vclink::test::InterruptedMerge;
-using vclink::test::LibGit2Session;
-using vclink::test::numberFrom;
-using vclink::test::Random;
-using vclink::test::Workplace;
+using namespace vclink::test;
 
 const std::vector<std::string> operations{
     "commit",      "revertFiles", "switchBranch", "mergeFastForward", "mergeThreeWay",

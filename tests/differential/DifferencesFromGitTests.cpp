@@ -18,16 +18,14 @@ namespace
 
 using vclink::FileState;
 using vclink::git::LibGit2Exception;
-using vclink::test::asPath;
-using vclink::test::GitRepository;
-using vclink::test::States;
+using namespace vclink::test;
 
-class DifferencesFromGit : public vclink::test::GitFixture
+class DifferencesFromGit : public GitFixture
 {
   protected:
     static States statesOf(const GitRepository &repository)
     {
-        return vclink::test::statesOfAll(*adapterFor(repository));
+        return statesOfAll(*adapterFor(repository));
     }
     static std::string statusOf(const GitRepository &repository)
     {
@@ -35,7 +33,7 @@ class DifferencesFromGit : public vclink::test::GitFixture
     }
 
   private:
-    vclink::test::LibGit2Session session_{environment()};
+    LibGit2Session session_{environment()};
 };
 
 // For git, all below an ignored folder is ignored. libgit2 asks the rules about each folder on the

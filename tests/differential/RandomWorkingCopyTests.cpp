@@ -19,10 +19,7 @@ namespace
 
 namespace fs = std::filesystem;
 using vclink::FileState;
-using vclink::test::Comparison;
-using vclink::test::LibGit2Session;
-using vclink::test::OtherRepository;
-using vclink::test::RandomWorkingCopy;
+using namespace vclink::test;
 
 constexpr std::uint64_t copyBlocks = 20;
 constexpr std::uint64_t copiesInBlock = 25;
@@ -36,8 +33,7 @@ int countFailures()
 /// 25 working copies a block. Each failure prints the seed of its copy and what was done to make
 /// it. To make one copy again, run this program with the seed in VCLINK_SEED; every block is that
 /// copy alone then. VCLINK_KEEP besides names a path to which the copy is moved in the end.
-class RandomWorkingCopies : public vclink::test::GitFixture,
-                            public testing::WithParamInterface<std::uint64_t>
+class RandomWorkingCopies : public GitFixture, public testing::WithParamInterface<std::uint64_t>
 {
   protected:
     void compareCopy(std::uint64_t seed)

@@ -19,9 +19,7 @@ namespace
 {
 
 namespace fs = std::filesystem;
-using vclink::test::GitRepository;
-using vclink::test::numberFrom;
-using vclink::test::RandomWorkingCopy;
+using namespace vclink::test;
 
 constexpr std::uint64_t refreshBlocks = 2;
 constexpr std::uint64_t refreshesInBlock = 15;
@@ -52,8 +50,8 @@ Refreshed refresh(const GitRepository &repository, bool isLibraryFirst)
 Refreshed refreshAsOwner(const GitRepository &repository, bool isLibraryFirst)
 {
     constexpr char separator = '\0';
-    vclink::test::giveToUnprivilegedUser(repository.path());
-    const std::string both = vclink::test::runAsUnprivilegedUser(
+    giveToUnprivilegedUser(repository.path());
+    const std::string both = runAsUnprivilegedUser(
         [&]
         {
             const Refreshed refreshed = refresh(repository, isLibraryFirst);
@@ -67,7 +65,7 @@ Refreshed refreshAsOwner(const GitRepository &repository, bool isLibraryFirst)
 /// VCLINK_FIRST_COPY. Each failure prints the seed of its copy and what was done to make it. To
 /// make one copy again, run this program with the seed in VCLINK_SEED; every block is that copy
 /// alone then. VCLINK_KEEP besides names a path to which the copy is moved in the end.
-class RefreshOfRandomWorkingCopies : public vclink::test::GitFixture,
+class RefreshOfRandomWorkingCopies : public GitFixture,
                                      public testing::WithParamInterface<std::uint64_t>
 {
   protected:
@@ -76,8 +74,8 @@ class RefreshOfRandomWorkingCopies : public vclink::test::GitFixture,
         const fs::path path = folder() / std::to_string(seed);
         RandomWorkingCopy copy(seed, path, other_);
         copy.make();
-        vclink::test::Random random(seed + 1);
-        vclink::test::RefreshHazards hazards(random, copy.repository());
+        Random random(seed + 1);
+        RefreshHazards hazards(random, copy.repository());
         hazards.add();
         const bool isLibraryFirst = random.chance(50);
         const Refreshed refreshed = hazards.hasUnreadable()
@@ -99,8 +97,8 @@ class RefreshOfRandomWorkingCopies : public vclink::test::GitFixture,
     int refreshed_ = 0;
 
   private:
-    vclink::test::LibGit2Session session_{environment()};
-    vclink::test::OtherRepository other_{folder() / "other"};
+    LibGit2Session session_{environment()};
+    OtherRepository other_{folder() / "other"};
 };
 
 TEST_P(RefreshOfRandomWorkingCopies, IsThatOfLibGit2Alone)

@@ -33,11 +33,7 @@ namespace
 namespace fs = std::filesystem;
 using vclink::git::BranchManager;
 using vclink::git::GitException;
-using vclink::test::asUtf8;
-using vclink::test::GitRepository;
-using vclink::test::MergeCommit;
-using vclink::test::MergedPaths;
-using vclink::test::MergeHistory;
+using namespace vclink::test;
 
 constexpr std::uint64_t mergeBlocks = 8;
 constexpr std::size_t mergeCount = 208;
@@ -68,8 +64,7 @@ void reset(const GitRepository &repository, const std::string &commit)
 /// A history's merges once more: by the library, by libgit2 alone and by git, each in a working
 /// copy of its own. VCLINK_SEED chooses another history than the usual one; VCLINK_KEEP names a
 /// path to which the working copies are moved in the end.
-class MergeReplay : public vclink::test::GitFixture,
-                    public testing::WithParamInterface<std::uint64_t>
+class MergeReplay : public GitFixture, public testing::WithParamInterface<std::uint64_t>
 {
   protected:
     MergeReplay()
@@ -152,7 +147,7 @@ class MergeReplay : public vclink::test::GitFixture,
         ASSERT_NE(end, std::string::npos) << outcome;
         const auto begin = outcome.rfind('\'', end - 1) + 1;
         const std::string path = outcome.substr(begin, end - begin);
-        EXPECT_TRUE(vclink::test::MergeExplanations(git_, merge).isRenamedOntoFolder(path)) << path;
+        EXPECT_TRUE(MergeExplanations(git_, merge).isRenamedOntoFolder(path)) << path;
         EXPECT_EQ(library_.git({"status", "--porcelain"}), "");
         EXPECT_EQ(library_.git({"rev-parse", "HEAD"}), merge.firstParent + '\n');
         ++counts_["refused"];
@@ -168,7 +163,7 @@ class MergeReplay : public vclink::test::GitFixture,
         EXPECT_EQ(byLibrary.underWay, byFloor.underWay);
         EXPECT_EQ(byLibrary.index, byFloor.index);
         EXPECT_EQ(byLibrary.workingTree, byFloor.workingTree);
-        EXPECT_EQ(vclink::test::statesOfAll(*adapter_), vclink::test::statesOfAll(*floorAdapter_));
+        EXPECT_EQ(statesOfAll(*adapter_), statesOfAll(*floorAdapter_));
     }
 
     void compareWithGit(const MergeCommit &merge, const std::string &outcome)
@@ -196,7 +191,7 @@ class MergeReplay : public vclink::test::GitFixture,
     void explain(const MergeCommit &merge, std::set<std::string> unexplained,
                  const MergedPaths &byLibrary, const MergedPaths &byGit)
     {
-        const vclink::test::MergeExplanations explanations(git_, merge);
+        const MergeExplanations explanations(git_, merge);
         for (auto path = unexplained.begin(); path != unexplained.end();)
         {
             const std::string rule = explanations.explain(*path, byLibrary, byGit);
@@ -256,7 +251,7 @@ class MergeReplay : public vclink::test::GitFixture,
         return repository.git({"log", "-1", "--format=%T %P"});
     }
 
-    vclink::test::LibGit2Session session_{environment()};
+    LibGit2Session session_{environment()};
     GitRepository library_{folder() / "library"};
     GitRepository floor_{folder() / "floor"};
     GitRepository git_{folder() / "git"};
@@ -289,7 +284,7 @@ TEST_P(MergeReplay, GivesWhatLibGit2GivesAndDiffersFromGitByRuleOnly)
     }
 }
 
-class MergeHistories : public vclink::test::GitFixture
+class MergeHistories : public GitFixture
 {
 };
 
@@ -306,7 +301,7 @@ TEST_F(MergeHistories, HoldMergesOfEveryKindAndSeveralMergeBases)
             repository.git({"merge-base", "--all", merge.firstParent, merge.secondParent});
         severalBases += std::count(bases.begin(), bases.end(), '\n') > 1 ? 1 : 0;
     }
-    for (const auto &kind : vclink::test::MergeEdits::kinds())
+    for (const auto &kind : MergeEdits::kinds())
         EXPECT_EQ(kinds.count(kind.name), 1u) << kind.name;
     EXPECT_GE(severalBases, 10);
 }

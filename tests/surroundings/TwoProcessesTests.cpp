@@ -31,11 +31,7 @@ namespace
 
 namespace fs = std::filesystem;
 namespace git = vclink::git;
-using vclink::test::asPaths;
-using vclink::test::blobIdOf;
-using vclink::test::GitRepository;
-using vclink::test::numberFrom;
-using vclink::test::Peer;
+using namespace vclink::test;
 
 constexpr int filesInFolder = 30;
 const std::string work = "the work of the user\n";
@@ -47,7 +43,7 @@ const std::string committing = "add and commit";
 struct Library
 {
     explicit Library(const GitRepository &repository)
-        : copy(repository), adapter(vclink::test::adapterFor(repository)),
+        : copy(repository), adapter(adapterFor(repository)),
           branches(git::BranchManager::create(*adapter))
     {
     }
@@ -63,7 +59,7 @@ struct Library
 
 bool isIndexed(const GitRepository &copy, const std::string &path)
 {
-    return vclink::test::takeSnapshot(copy.path(), copy.path()).index.count(path + " 0") == 1;
+    return takeSnapshot(copy.path(), copy.path()).index.count(path + " 0") == 1;
 }
 
 /// Empty for none.
@@ -100,14 +96,13 @@ struct Operation
 
 bool isWorkKept(const GitRepository &copy)
 {
-    const auto index = vclink::test::takeSnapshot(copy.path(), copy.path()).indexIds;
-    return index.count(blobIdOf(work)) == 1 ||
-           vclink::test::tipContents(copy.path()).count(blobIdOf(work)) == 1;
+    const auto index = takeSnapshot(copy.path(), copy.path()).indexIds;
+    return index.count(blobIdOf(work)) == 1 || tipContents(copy.path()).count(blobIdOf(work)) == 1;
 }
 
 bool isWorkCommitted(const GitRepository &copy)
 {
-    return vclink::test::tipContents(copy.path()).count(blobIdOf(work)) == 1;
+    return tipContents(copy.path()).count(blobIdOf(work)) == 1;
 }
 
 const std::vector<Operation> operations{
@@ -173,7 +168,7 @@ std::ostream &operator<<(std::ostream &stream, const Operation &operation)
 
 /// Each of the library's operations beside each operation of the peer, each time in a new working
 /// copy. VCLINK_ROUNDS sets how many times, VCLINK_SEED when the library begins.
-class TwoProcesses : public vclink::test::GitFixture, public testing::WithParamInterface<Operation>
+class TwoProcesses : public GitFixture, public testing::WithParamInterface<Operation>
 {
   protected:
     TwoProcesses()
@@ -289,15 +284,14 @@ class TwoProcesses : public vclink::test::GitFixture, public testing::WithParamI
     static void expectKept(const GitRepository &copy, const std::vector<std::string> &acknowledged,
                            const std::string &edited, const std::string &raised)
     {
-        const auto after = vclink::test::takeSnapshot(copy.path(), copy.path());
-        const auto committed = vclink::test::tipContents(copy.path());
+        const auto after = takeSnapshot(copy.path(), copy.path());
+        const auto committed = tipContents(copy.path());
         for (const auto &id : acknowledged)
             EXPECT_TRUE(after.indexIds.count(id) == 1 || committed.count(id) == 1)
                 << id << ", acknowledged by git, is neither in the index nor in a branch\n"
                 << raised;
         const std::set<std::string> user{blobIdOf(edited.empty() ? "" : work)};
-        EXPECT_TRUE(edited.empty() || vclink::test::lostOf(user, after, copy.path()).empty())
-            << raised;
+        EXPECT_TRUE(edited.empty() || lostOf(user, after, copy.path()).empty()) << raised;
     }
     static std::string locksIn(const GitRepository &copy)
     {
@@ -308,10 +302,10 @@ class TwoProcesses : public vclink::test::GitFixture, public testing::WithParamI
         return locks;
     }
 
-    vclink::test::LibGit2Session session_{environment()};
+    LibGit2Session session_{environment()};
     const fs::path origin_ = folder() / "origin";
     const fs::path copy_ = folder() / "copy";
-    vclink::test::Random random_{numberFrom("VCLINK_SEED", 1)};
+    Random random_{numberFrom("VCLINK_SEED", 1)};
     std::map<std::string, int> counts_;
     int done_ = 0;
     std::uint64_t unstaged_ = 0;

@@ -9,14 +9,9 @@
 namespace
 {
 
-using vclink::test::allTransports;
-using vclink::test::asPath;
-using vclink::test::asUtf16;
-using vclink::test::failureOf;
-using vclink::test::GitRepository;
-using vclink::test::referencesOf;
+using namespace vclink::test;
 
-class Clone : public vclink::test::TransportFixture
+class Clone : public TransportFixture
 {
   protected:
     /// Branches, tags of both kinds, and files of every kind that a tree holds.

@@ -11,15 +11,11 @@
 namespace
 {
 
-using vclink::test::allTransports;
-using vclink::test::failureOf;
-using vclink::test::GitRepository;
-using vclink::test::referencesOf;
-using vclink::test::Transport;
+using namespace vclink::test;
 
 /// Two clones of one repository: what the library fetches into the one is what git fetches into the
 /// other.
-class Fetch : public vclink::test::TransportFixture
+class Fetch : public TransportFixture
 {
   protected:
     Fetch()
@@ -188,7 +184,7 @@ TEST_P(Fetch, KeepsAShallowRepositorySound)
 {
     constexpr std::string_view into = "refs/heads/main:refs/heads/";
     const bool isByPath = GetParam() == Transport::Path || GetParam() == Transport::File;
-    const int failure = vclink::test::libgit2_release::failureOfShallowFetch(isByPath);
+    const int failure = libgit2_release::failureOfShallowFetch(isByPath);
     const std::string old = change("file", "second\n");
     publish({"main", ":deleted"});
     GitRepository shallow = makeRepository("shallow");

@@ -21,19 +21,7 @@
 namespace
 {
 
-using vclink::test::asPath;
-using vclink::test::asUtf16;
-using vclink::test::Connection;
-using vclink::test::Failure;
-using vclink::test::failureOf;
-using vclink::test::Fate;
-using vclink::test::GitRepository;
-using vclink::test::isCancelled;
-using vclink::test::LogCapture;
-using vclink::test::NoDescriptorLeak;
-using vclink::test::RelayPlan;
-using vclink::test::relayTo;
-using vclink::test::ScriptedServer;
+using namespace vclink::test;
 
 /// A failure that says what it is.
 void expectToldBy(const Failure &failure)
@@ -45,8 +33,7 @@ void expectToldBy(const Failure &failure)
 }
 
 /// Servers that can't be talked to at all, each behind every kind of address.
-class UselessServer : public vclink::test::RemoteFixture,
-                      public testing::WithParamInterface<const char *>
+class UselessServer : public RemoteFixture, public testing::WithParamInterface<const char *>
 {
   protected:
     /// Expects that every operation fails, and says so, against a server that does `script`.
@@ -107,7 +94,7 @@ INSTANTIATE_TEST_SUITE_P(Behind, UselessServer,
                          });
 
 /// Servers that begin well.
-class MisbehavingServer : public vclink::test::DaemonFixture
+class MisbehavingServer : public DaemonFixture
 {
   protected:
     /// Passes everything on until so much went to the client, then ends.
@@ -160,13 +147,13 @@ TEST_F(MisbehavingServer, InTheMiddleOfAFetchLeavesTheReferences)
     const auto cloned = GitRepository::clone(url_, folder() / "clone");
     const std::string id = commitNoise(source_, 2);
     source_.git({"push", "--quiet", served_.path(), "HEAD:refs/heads/main"});
-    const std::string before = vclink::test::referencesOf(cloned);
+    const std::string before = referencesOf(cloned);
     {
         const ScriptedServer broken(endingAfter(size / 2, Fate::Closes));
         cloned.git({"remote", "set-url", "origin", urlAt(broken.port())});
         expectToldBy(failureOf([&] { fetch(cloned); }));
     }
-    EXPECT_EQ(vclink::test::referencesOf(cloned), before);
+    EXPECT_EQ(referencesOf(cloned), before);
     expectSound(cloned);
     cloned.git({"remote", "set-url", "origin", url_});
     fetch(cloned);

@@ -17,15 +17,10 @@ namespace
 using testing::ElementsAre;
 using testing::HasSubstr;
 using testing::UnorderedElementsAre;
-using vclink::test::allTransports;
-using vclink::test::failureOf;
-using vclink::test::GitRepository;
-using vclink::test::LogCapture;
-using vclink::test::Transport;
-using vclink::test::transportsWithServer;
+using namespace vclink::test;
 
 /// A clone, in which a commit was made.
-class Push : public vclink::test::TransportFixture
+class Push : public TransportFixture
 {
   protected:
     Push()

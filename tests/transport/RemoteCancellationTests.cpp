@@ -19,17 +19,7 @@ namespace
 {
 
 namespace git = vclink::git;
-using vclink::test::asPath;
-using vclink::test::asUtf16;
-using vclink::test::Connection;
-using vclink::test::Fate;
-using vclink::test::GitRepository;
-using vclink::test::isCancelled;
-using vclink::test::LogCapture;
-using vclink::test::LogRecord;
-using vclink::test::RelayPlan;
-using vclink::test::relayTo;
-using vclink::test::ScriptedServer;
+using namespace vclink::test;
 
 /// Whether a record is one of a kind.
 bool begins(const LogRecord &record, const std::string &text)
@@ -37,7 +27,7 @@ bool begins(const LogRecord &record, const std::string &text)
     return record.message.compare(0, text.size(), text) == 0;
 }
 
-class RemoteCancellation : public vclink::test::DaemonFixture
+class RemoteCancellation : public DaemonFixture
 {
   protected:
     /// A script that passes the server's answers on, a little at a time. When a tenth has gone
@@ -145,7 +135,7 @@ TEST_F(RemoteCancellation, StopsTheCheckoutOfAClone)
 TEST_F(RemoteCancellation, OfAFetchLeavesTheReferencesAndTheNextFetchWorks)
 {
     const auto cloned = makeClonedBefore();
-    const std::string before = vclink::test::referencesOf(cloned);
+    const std::string before = referencesOf(cloned);
     const auto adapter = makeAdapter(cloned);
     const auto remote = git::GitRemote::create("origin", *adapter);
     {
@@ -154,7 +144,7 @@ TEST_F(RemoteCancellation, OfAFetchLeavesTheReferencesAndTheNextFetchWorks)
         EXPECT_TRUE(isCancelled([&] { remote->fetch({}); }));
     }
     EXPECT_LT(transferred_, size) << "it was not waited for the rest";
-    EXPECT_EQ(vclink::test::referencesOf(cloned), before);
+    EXPECT_EQ(referencesOf(cloned), before);
     expectSound(cloned);
 
     cloned.git({"remote", "set-url", "origin", url_});

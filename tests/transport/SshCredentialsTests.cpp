@@ -22,18 +22,10 @@ namespace
 {
 
 using testing::HasSubstr;
-using vclink::test::Failure;
-using vclink::test::failureOf;
-using vclink::test::GitRepository;
-using vclink::test::LogCapture;
-using vclink::test::makeSshKey;
-using vclink::test::SshAgent;
-using vclink::test::SshServer;
-namespace libgit2_release = vclink::test::libgit2_release;
+using namespace vclink::test;
 
 /// A repository with one commit, on a server that lets one key in.
-class SshCredentials : public vclink::test::ServerOfTheSuite<SshServer>,
-                       public vclink::test::RemoteFixture
+class SshCredentials : public ServerOfTheSuite<SshServer>, public RemoteFixture
 {
   protected:
     using ServerOfTheSuite<SshServer>::TearDownTestSuite;
@@ -160,7 +152,7 @@ TEST_F(SshCredentials, HaveNoUserWhereTheAddressHasNone)
 }
 
 /// A server that takes passwords only.
-class SshPasswords : public vclink::test::RemoteFixture
+class SshPasswords : public RemoteFixture
 {
   protected:
     SshServer server_{SshServer::Offers::Passwords};

@@ -18,13 +18,10 @@
 namespace
 {
 
-using vclink::test::Command;
-using vclink::test::GitRepository;
-using vclink::test::LogCapture;
-using vclink::test::WebServer;
-using Site = vclink::test::WebServer::Site;
+using Site = WebServer::Site;
+using namespace vclink::test;
 
-class WebTest : public vclink::test::ServerOfTheSuite<WebServer>, public vclink::test::RemoteFixture
+class WebTest : public ServerOfTheSuite<WebServer>, public RemoteFixture
 {
   protected:
     using ServerOfTheSuite<WebServer>::TearDownTestSuite;
@@ -47,7 +44,7 @@ TEST_P(WebPassword, IsAskedForInVain)
 {
     const std::string url = server().urlAt(GetParam(), served_);
     const LogCapture log(vclink::git::SeverityParameter);
-    const auto failure = vclink::test::failureOf([&] { clone(url, "clone"); });
+    const auto failure = failureOf([&] { clone(url, "clone"); });
     std::cout << "ends with " << testing::PrintToString(failure) << '\n';
     EXPECT_EQ(failure.code, GIT_ERROR);
     EXPECT_EQ(failure.text, "");
@@ -67,9 +64,8 @@ TEST_P(WebPassword, AskedForInVainLeavesNoTextOfAnEarlierCall)
     for (int round = 0; round < 2; ++round)
     {
         for (const auto &failure :
-             {vclink::test::failureOf([&] { push(source, {"HEAD:refs/heads/other"}); }),
-              vclink::test::failureOf([&] { fetch(source); }),
-              vclink::test::failureOf([&] { heads(source); })})
+             {failureOf([&] { push(source, {"HEAD:refs/heads/other"}); }),
+              failureOf([&] { fetch(source); }), failureOf([&] { heads(source); })})
         {
             EXPECT_EQ(failure.code, GIT_ERROR);
             EXPECT_EQ(failure.errorClass, 0);
