@@ -5,11 +5,11 @@
 #include <gtest/gtest.h>
 
 #include "expectedStates.hpp"
+#include "support/Failure.hpp"
 #include "support/GitFixture.hpp"
 #include "support/LibGit2Session.hpp"
 #include "support/adapterFor.hpp"
 #include "support/text.hpp"
-#include "vclink/git/LibGit2Exception.hpp"
 
 /// What the library says or does where git does something else, for states and changes that the
 /// random working copies and sequences keep clear of.
@@ -17,7 +17,6 @@ namespace
 {
 
 using vclink::FileState;
-using vclink::git::LibGit2Exception;
 using namespace vclink::test;
 
 class DifferencesFromGit : public GitFixture
@@ -116,15 +115,9 @@ TEST_F(DifferencesFromGit, AFileThatTookTheirFoldersPlaceIsInTheWayOfARevert)
     repository.write("folder", "instead");
     repository.git({"rm", "--quiet", "--cached", "folder/file"});
     const auto adapter = adapterFor(repository);
-    try
-    {
-        adapter->revertFiles({asPath(repository / "folder/file")});
-        ADD_FAILURE() << "nothing was raised";
-    }
-    catch (const LibGit2Exception &exception)
-    {
-        EXPECT_EQ(exception.getError().getCode(), GIT_ECONFLICT);
-    }
+    const Failure failure =
+        failureOf([&] { adapter->revertFiles({asPath(repository / "folder/file")}); });
+    EXPECT_EQ(failure.code, GIT_ECONFLICT);
     EXPECT_EQ(repository.read("folder"), "instead");
     EXPECT_EQ(statusOf(repository), "D  folder/file\n?? folder\n");
 }

@@ -5,31 +5,26 @@
 #include <git2.h>
 #include <gtest/gtest.h>
 
+#include "support/Failure.hpp"
 #include "support/GitFixture.hpp"
 #include "support/LibGit2Session.hpp"
 #include "support/UnprivilegedUser.hpp"
 #include "support/text.hpp"
 #include "vclink/git/GitAdapterFactory.hpp"
-#include "vclink/git/LibGit2Exception.hpp"
 
 namespace
 {
 
 using vclink::git::GitAdapterFactory;
-using vclink::git::LibGit2Exception;
-using vclink::test::asPath;
+using namespace vclink::test;
 
 /// "true", "false", or the code of the exception.
 std::string probe(const std::string &path)
 {
-    try
-    {
-        return GitAdapterFactory().isAdapterFor(asPath(path)) ? "true" : "false";
-    }
-    catch (const LibGit2Exception &exception)
-    {
-        return std::to_string(exception.getError().getCode());
-    }
+    bool isAdapter = false;
+    const auto failure =
+        failureIfAny([&] { isAdapter = GitAdapterFactory().isAdapterFor(asPath(path)); });
+    return failure ? std::to_string(failure->code) : isAdapter ? "true" : "false";
 }
 
 /// The same, asked of libgit2 itself.
@@ -40,7 +35,7 @@ std::string probeDirectly(const std::string &path)
     return code == 0 ? "true" : code == GIT_ENOTFOUND ? "false" : std::to_string(code);
 }
 
-class IsAdapterFor : public vclink::test::GitFixture
+class IsAdapterFor : public GitFixture
 {
   protected:
     void expectProbe(const std::filesystem::path &path, const std::string &expected) const
@@ -49,8 +44,8 @@ class IsAdapterFor : public vclink::test::GitFixture
         EXPECT_EQ(probeDirectly(path), expected) << path;
     }
 
-    vclink::test::LibGit2Session session_{environment()};
-    vclink::test::GitRepository repository_ = makeRepository();
+    LibGit2Session session_{environment()};
+    GitRepository repository_ = makeRepository();
 };
 
 /// Also one that is bare, linked, a submodule, reached through a link, or damaged where only an
@@ -112,21 +107,21 @@ TEST_F(IsAdapterFor, RaisesForAGitFileThatCannotBeReadAndANameThatTheSystemRefus
 
 TEST_F(IsAdapterFor, RaisesWhereTheFolderCannotBeReached)
 {
-    vclink::test::giveToUnprivilegedUser(repository_.path());
+    giveToUnprivilegedUser(repository_.path());
     const std::string inside = repository_ / "locked/inside";
     std::filesystem::create_directories(inside);
     repository_.setMode("locked", 0000);
-    EXPECT_EQ(vclink::test::runAsUnprivilegedUser(
-                  [&] { return probe(repository_.path()) + " " + probe(inside); }),
-              "true " + std::to_string(GIT_ERROR));
+    EXPECT_EQ(
+        runAsUnprivilegedUser([&] { return probe(repository_.path()) + " " + probe(inside); }),
+        "true " + std::to_string(GIT_ERROR));
 }
 
 /// libgit2 cannot distinguish such a folder from one without a repository.
 TEST_F(IsAdapterFor, AnswersAsLibGit2DoesForAFolderThatCannotBeLookedInto)
 {
-    vclink::test::giveToUnprivilegedUser(repository_.path());
+    giveToUnprivilegedUser(repository_.path());
     std::filesystem::permissions(repository_.path(), std::filesystem::perms(0000));
-    EXPECT_EQ(vclink::test::runAsUnprivilegedUser(
+    EXPECT_EQ(runAsUnprivilegedUser(
                   [&] { return probe(repository_.path()) + probeDirectly(repository_.path()); }),
               "falsefalse");
 }

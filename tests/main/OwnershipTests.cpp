@@ -5,22 +5,20 @@
 #include <gtest/gtest.h>
 
 #include "AdapterFixture.hpp"
+#include "support/Failure.hpp"
 #include "support/UnprivilegedUser.hpp"
 #include "support/libgit2Release.hpp"
 #include "support/text.hpp"
 #include "vclink/git/GitAdapterFactory.hpp"
-#include "vclink/git/LibGit2Exception.hpp"
 
 namespace
 {
 
-using vclink::git::LibGit2Exception;
-using vclink::test::asPath;
-namespace libgit2_release = vclink::test::libgit2_release;
+using namespace vclink::test;
 
 /// A repository of whoever runs the tests, met by the unprivileged user, who is another one where
 /// the tests run as root.
-class Ownership : public vclink::test::AdapterFixture
+class Ownership : public AdapterFixture
 {
   protected:
     Ownership()
@@ -32,42 +30,32 @@ class Ownership : public vclink::test::AdapterFixture
 
     void trust(const std::string &folders) const
     {
-        vclink::test::GitRepository(environment().home())
+        GitRepository(environment().home())
             .write(".gitconfig", "[safe]\n\tdirectory = " + folders + "\n");
     }
 
-    /// What the first operation comes to: "code class text", or the number of states.
+    /// What the first operation comes to: the failure, or the number of states.
     std::string openedByTheOther() const
     {
-        return vclink::test::runAsUnprivilegedUser(
-            [this]() -> std::string
+        return runAsUnprivilegedUser(
+            [this]
             {
-                const upath root = asPath(repository_.path());
-                try
-                {
-                    const auto states = makeAdapter(repository_.path())->getFolderStates(root);
-                    return std::to_string(states.size()) + " states";
-                }
-                catch (const LibGit2Exception &exception)
-                {
-                    const auto &error = exception.getError();
-                    return std::to_string(error.getCode()) + ' ' +
-                           std::to_string(error.getErrorClass()) + ' ' +
-                           vclink::test::asUtf8(error.getMessage());
-                }
+                std::size_t count = 0;
+                const auto failure = failureIfAny([&] { count = allStates(repository_).size(); });
+                return failure ? printed(*failure) : std::to_string(count) + " states";
             });
     }
     std::string notOwned() const
     {
-        return "-36 7 repository path '" + repository_.path().string() +
+        return "code -36, class 7: repository path '" + repository_.path().string() +
                std::string(libgit2_release::endOfOwnedPath) + "' is not owned by current user";
     }
     static std::string unlessOwn(const std::string &refused)
     {
-        return vclink::test::runsAsRoot() ? refused : "1 states";
+        return runsAsRoot() ? refused : "1 states";
     }
 
-    vclink::test::GitRepository repository_ = makeRepository();
+    GitRepository repository_ = makeRepository();
 };
 
 TEST_F(Ownership, OfAnotherUserRefusesTheFirstOperation)
@@ -75,7 +63,7 @@ TEST_F(Ownership, OfAnotherUserRefusesTheFirstOperation)
     EXPECT_EQ(openedByTheOther(),
               unlessOwn(libgit2_release::needsNoSafeDirectory
                             ? notOwned()
-                            : "-3 7 config value 'safe.directory' was not found"));
+                            : "code -3, class 7: config value 'safe.directory' was not found"));
 }
 
 TEST_F(Ownership, OfAnotherUserIsNamedWhereOtherFoldersAreTrusted)
@@ -100,19 +88,19 @@ TEST_F(Ownership, OfAnotherUserIsTrustedByAStarWhereLibGit2Knows)
 /// A probe looks at the layout only.
 TEST_F(Ownership, OfAnotherUserIsNotSeenByAProbe)
 {
-    const auto probe = [this]() -> std::string
+    const auto probe = [this]
     {
         const upath root = asPath(repository_.path());
         return vclink::git::GitAdapterFactory().isAdapterFor(root) ? "true" : "false";
     };
-    EXPECT_EQ(vclink::test::runAsUnprivilegedUser(probe), "true");
+    EXPECT_EQ(runAsUnprivilegedUser(probe), "true");
     trust("/another/folder");
-    EXPECT_EQ(vclink::test::runAsUnprivilegedUser(probe), "true");
+    EXPECT_EQ(runAsUnprivilegedUser(probe), "true");
 }
 
 TEST_F(Ownership, IsFineForTheOneWhoOwnsTheRepository)
 {
-    vclink::test::giveToUnprivilegedUser(repository_.path());
+    giveToUnprivilegedUser(repository_.path());
     EXPECT_EQ(openedByTheOther(), "1 states");
 }
 

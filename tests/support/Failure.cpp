@@ -32,10 +32,17 @@ std::string printed(const Failure &failure)
 
 Failure failureOf(const std::function<void()> &action)
 {
+    const std::optional<Failure> failure = failureIfAny(action);
+    EXPECT_TRUE(failure) << "no exception";
+    return failure.value_or(Failure());
+}
+
+std::optional<Failure> failureIfAny(const std::function<void()> &action)
+{
     try
     {
         action();
-        ADD_FAILURE() << "no exception";
+        return {};
     }
     catch (const git::LibGit2Exception &exception)
     {
@@ -46,7 +53,6 @@ Failure failureOf(const std::function<void()> &action)
         EXPECT_NE(asUtf8(exception.GetUnicodeMessageTxt()).find(failure.text), std::string::npos);
         return failure;
     }
-    return {};
 }
 
 } // namespace vclink::test

@@ -3,6 +3,7 @@
 
 #include <functional>
 #include <iosfwd>
+#include <optional>
 #include <string>
 
 namespace vclink::test
@@ -24,5 +25,7 @@ std::string printed(const Failure &failure);
 /// Returns the LibGit2Exception that `action` throws. The test fails if it throws none, one of
 /// another class, or one whose message does not show its text.
 Failure failureOf(const std::function<void()> &action);
+/// The same of an action that may also succeed.
+std::optional<Failure> failureIfAny(const std::function<void()> &action);
 
 } // namespace vclink::test

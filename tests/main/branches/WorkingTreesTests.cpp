@@ -12,7 +12,6 @@
 #include "main/files/runScript.hpp"
 #include "main/merge/MergeFixture.hpp"
 #include "support/WithoutLeakChecks.hpp"
-#include "vclink/git/LibGit2Exception.hpp"
 
 namespace
 {
@@ -50,15 +49,7 @@ class OtherWorkingTree : public MergeFixture, public testing::WithParamInterface
 
     static bool isRefused(const std::function<void()> &action)
     {
-        try
-        {
-            action();
-            return false;
-        }
-        catch (const vclink::git::LibGit2Exception &)
-        {
-            return true;
-        }
+        return failureIfAny(action).has_value();
     }
 };
 

@@ -160,15 +160,7 @@ TEST_F(ClearedWay, FailsAtWhatItCannotRemove)
         [this]
         {
             git::ClearedWay way;
-            try
-            {
-                way.remove((*this / "link").string());
-            }
-            catch (const git::LibGit2Exception &exception)
-            {
-                return asUtf8(exception.getError().getMessage());
-            }
-            return std::string("removed");
+            return failureOf([&] { way.remove((*this / "link").string()); }).text;
         });
     fs::permissions(*this / "", fs::perms::owner_all);
     EXPECT_EQ(outcome, "could not remove '" + (*this / "link").string() + "': Permission denied");

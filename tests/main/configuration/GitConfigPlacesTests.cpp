@@ -8,6 +8,7 @@
 
 #include "GitConfigFixture.hpp"
 #include "support/Descriptors.hpp"
+#include "support/Failure.hpp"
 #include "vclink/git/LibGit2Exception.hpp"
 
 namespace
@@ -23,16 +24,15 @@ class GitConfigPlaces : public GitConfigFixture
     /// What the diff tool's value is, or the code of the constructor's failure.
     static std::string describe()
     {
-        try
-        {
-            const GitConfig config;
-            return shown(config.readDiffTool()) +
-                   (config.globalFilePath() ? ", path" : ", no path");
-        }
-        catch (const vclink::git::LibGit2Exception &exception)
-        {
-            return "raised " + std::to_string(exception.getError().getCode());
-        }
+        std::string found;
+        const auto failure = failureIfAny(
+            [&found]
+            {
+                const GitConfig config;
+                found = shown(config.readDiffTool()) +
+                        (config.globalFilePath() ? ", path" : ", no path");
+            });
+        return failure ? "raised " + std::to_string(failure->code) : found;
     }
 };
 

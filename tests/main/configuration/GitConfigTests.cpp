@@ -291,16 +291,8 @@ TEST_F(GitConfigFile, InAFolderThatCannotBeWrittenIsNotWritten)
         []() -> std::string
         {
             GitConfig config;
-            try
-            {
-                config.writeDiffTool();
-                return "written";
-            }
-            catch (const vclink::git::LibGit2Exception &exception)
-            {
-                return config.readDiffTool() ? "a value"
-                                             : asUtf8(exception.getError().getMessage());
-            }
+            const Failure failure = failureOf([&] { config.writeDiffTool(); });
+            return config.readDiffTool() ? "a value" : failure.text;
         });
     std::filesystem::permissions(environment().home(), std::filesystem::perms(0755));
     EXPECT_THAT(answer, HasSubstr("Permission denied"));
@@ -312,16 +304,11 @@ TEST_F(GitConfigFile, InAFolderThatCannotBeWrittenIsNotWritten)
 TEST_F(GitConfigFile, ThatCannotBeReadMakesTheConstructorRaise)
 {
     writeFile(global(), "[difftool \"vkDiff\"]\n\tcmd = mine\n");
-    const auto answer = []() -> std::string
+    const auto answer = []
     {
-        try
-        {
-            return shown(GitConfig().readDiffTool());
-        }
-        catch (const vclink::git::LibGit2Exception &exception)
-        {
-            return "raised " + std::to_string(exception.getError().getCode());
-        }
+        std::string value;
+        const auto failure = failureIfAny([&] { value = shown(GitConfig().readDiffTool()); });
+        return failure ? "raised " + std::to_string(failure->code) : value;
     };
     EXPECT_EQ(runAsUnprivilegedUser(answer), "mine");
     std::filesystem::permissions(global(), std::filesystem::perms(0));

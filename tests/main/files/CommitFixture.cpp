@@ -1,8 +1,8 @@
 // SPDX-License-Identifier: MIT
 #include "CommitFixture.hpp"
 
+#include "support/Failure.hpp"
 #include "support/UnprivilegedUser.hpp"
-#include "vclink/git/LibGit2Exception.hpp"
 
 namespace vclink::test
 {
@@ -38,19 +38,12 @@ void CommitFixture::giveAway() const
 std::string CommitFixture::commitAsItsOwner() const
 {
     return runAsUnprivilegedUser(
-        [this]() -> std::string
+        [this]
         {
-            try
-            {
-                commit();
-                return "committed";
-            }
-            catch (const git::LibGit2Exception &exception)
-            {
-                const git::GitError &error = exception.getError();
-                return std::to_string(error.getCode()) + ' ' +
-                       std::to_string(error.getErrorClass()) + ' ' + asUtf8(error.getMessage());
-            }
+            const auto failure = failureIfAny([this] { commit(); });
+            return failure ? std::to_string(failure->code) + ' ' +
+                                 std::to_string(failure->errorClass) + ' ' + failure->text
+                           : "committed";
         });
 }
 

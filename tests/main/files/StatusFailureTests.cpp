@@ -7,6 +7,7 @@
 #include "error/errorUtil/callbackException.hpp"
 #include "main/AdapterFixture.hpp"
 #include "support/Change.hpp"
+#include "support/Failure.hpp"
 #include "support/Sentence.hpp"
 #include "support/UnprivilegedUser.hpp"
 #include "support/libgit2Release.hpp"
@@ -19,19 +20,12 @@ namespace
 using vclink::git::LibGit2Exception;
 using namespace vclink::test;
 
-/// Code of what the query of the whole tree throws; 0 for none.
+/// Code of what the query of the whole tree throws.
 int raisedBy(vclink::git::GitAdapter &adapter)
 {
-    try
-    {
-        adapter.getFolderStates(adapter.getRootFolder());
-        return 0;
-    }
-    catch (const LibGit2Exception &exception)
-    {
-        EXPECT_FALSE(exception.getError().getMessage().empty());
-        return exception.getError().getCode();
-    }
+    const Failure failure = failureOf([&] { adapter.getFolderStates(adapter.getRootFolder()); });
+    EXPECT_NE(failure.text, "");
+    return failure.code;
 }
 
 class StatusFailure : public AdapterFixture
