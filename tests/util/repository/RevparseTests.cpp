@@ -81,27 +81,6 @@ TEST_F(Revparse, GivesTheIdThatGitGives)
         EXPECT_EQ(idOf(spec), repository_.line({"rev-parse", spec})) << spec;
 }
 
-TEST_F(Revparse, GivesTheIdOfACommitThatNoCacheKeeps)
-{
-    const std::string expected = repository_.line({"rev-parse", "HEAD"});
-    const git_oid *id = git::revparseId("HEAD", opened_.get());
-    EXPECT_EQ(git_oid_tostr_s(id), expected);
-}
-
-TEST_F(Revparse, GivesTheIdOfATagThatNoCacheKeeps)
-{
-    const std::string expected = repository_.line({"rev-parse", "big"});
-    const git_oid *id = git::revparseId("big", opened_.get());
-    EXPECT_EQ(git_oid_tostr_s(id), expected);
-}
-
-TEST_F(Revparse, GivesTheIdOfABlob)
-{
-    const std::string expected = repository_.line({"rev-parse", "HEAD:file"});
-    const git_oid *id = git::revparseId("HEAD:file", opened_.get());
-    EXPECT_EQ(git_oid_tostr_s(id), expected);
-}
-
 TEST_F(Revparse, GivesAnIdThatOutlivesTheRepository)
 {
     const std::string expected = repository_.line({"rev-parse", "HEAD"});
