@@ -1,8 +1,9 @@
 // SPDX-License-Identifier: MIT
 #include <csignal>
+#include <utility>
+#include <vector>
 
 #include <gmock/gmock.h>
-#include <sys/wait.h>
 
 #include "ShellFixture.hpp"
 #include "TerminalProcess.hpp"
@@ -29,8 +30,7 @@ class ShellInterrupt : public ShellFixture
         for (int number = 0; number < fileCount; ++number)
             repository_.write(nameOf(number), "");
         repository_.commitAll("many");
-        for (int number = 0; number < fileCount; ++number)
-            repository_.write(nameOf(number), "edited\n");
+        editAll();
     }
 
     /// Long, so that what is written of each file soon fills the terminal.
@@ -40,14 +40,26 @@ class ShellInterrupt : public ShellFixture
                std::to_string(number);
     }
 
-    /// A shell script that runs the program, as "$0", in the repository.
-    TerminalProcess start(const std::string &script) const
+    void editAll() const
+    {
+        for (int number = 0; number < fileCount; ++number)
+            repository_.write(nameOf(number), "edited\n");
+    }
+
+    /// A shell script that runs the program, as "$0", in the repository, and is sent these signals
+    /// when `sign` has appeared.
+    TerminalResult interrupt(const std::string &script, const std::string &sign,
+                             const std::vector<int> &signals = {SIGINT}) const
     {
         const std::string suppressions =
             "LSAN_OPTIONS=print_suppressions=0:suppressions=" VCLINK_LEAK_SUPPRESSIONS;
-        return TerminalProcess(
+        TerminalProcess process(
             {"env", "TERM=xterm", suppressions, "sh", "-c", script, VCLINK_SHELL},
             repository_.path());
+        process.readUntil(sign);
+        for (const int signal : signals)
+            process.send(signal);
+        return process.end();
     }
 
     std::size_t countChanges() const
@@ -55,20 +67,17 @@ class ShellInterrupt : public ShellFixture
         return split(repository_.git({"status", "--porcelain", "-z"}), '\0').size();
     }
 
+    const testing::Matcher<std::string> isCancelled_ =
+        AllOf(HasSubstr("Cancelling.\n"), EndsWith("vclink-shell: The operation was cancelled.\n"));
     GitRepository repository_ = makeRepository();
 };
 
 TEST_F(ShellInterrupt, CancelsARevertAndLeavesAWorkingCopyToGoOnWith)
 {
-    TerminalProcess process = start("exec \"$0\" --log progress revert .");
-    process.readUntil("Checkout Notify");
-    process.interrupt();
-    const std::string text = process.readAll();
-    const int status = process.wait();
-    ASSERT_TRUE(WIFEXITED(status)) << text;
-    EXPECT_EQ(WEXITSTATUS(status), 130);
-    EXPECT_THAT(text, AllOf(HasSubstr("Cancelling.\n"),
-                            EndsWith("vclink-shell: The operation was cancelled.\n")));
+    const TerminalResult result =
+        interrupt("exec \"$0\" --log progress revert .", "Checkout Notify");
+    EXPECT_EQ(result.exitStatus, 130);
+    EXPECT_THAT(result.text, isCancelled_);
 
     EXPECT_EQ(countChanges(), static_cast<std::size_t>(fileCount));
     EXPECT_EQ(statesIn(repository_.path()).size(), static_cast<std::size_t>(fileCount));
@@ -80,99 +89,60 @@ TEST_F(ShellInterrupt, CancelsARevertAndLeavesAWorkingCopyToGoOnWith)
 
 TEST_F(ShellInterrupt, IsToldInTheLanguageThatWasAskedFor)
 {
-    TerminalProcess process = start("exec \"$0\" --lang de --log progress revert .");
-    process.readUntil("Checkout Notify");
-    process.interrupt();
-    EXPECT_THAT(process.readAll(),
-                AllOf(HasSubstr("Wird abgebrochen.\n"),
-                      EndsWith("vclink-shell: Der Vorgang wurde abgebrochen.\n")));
-    const int status = process.wait();
-    ASSERT_TRUE(WIFEXITED(status));
-    EXPECT_EQ(WEXITSTATUS(status), 130);
+    const TerminalResult result =
+        interrupt("exec \"$0\" --lang de --log progress revert .", "Checkout Notify");
+    EXPECT_EQ(result.exitStatus, 130);
+    EXPECT_THAT(result.text, AllOf(HasSubstr("Wird abgebrochen.\n"),
+                                   EndsWith("vclink-shell: Der Vorgang wurde abgebrochen.\n")));
 }
 
 TEST_F(ShellInterrupt, ChangesNothingMoreWhenItIsRepeated)
 {
-    TerminalProcess process = start("exec \"$0\" --log progress revert .");
-    process.readUntil("Checkout Notify");
-    for (int time = 0; time < 5; ++time)
-        process.interrupt();
-    const std::string text = process.readAll();
-    const int status = process.wait();
-    ASSERT_TRUE(WIFEXITED(status)) << text;
-    EXPECT_EQ(WEXITSTATUS(status), 130);
-    EXPECT_THAT(text, Not(HasSubstr("at once")));
-    EXPECT_THAT(text, AllOf(HasSubstr("Cancelling.\n"),
-                            EndsWith("vclink-shell: The operation was cancelled.\n")));
+    const TerminalResult result = interrupt("exec \"$0\" --log progress revert .",
+                                            "Checkout Notify", std::vector<int>(5, SIGINT));
+    EXPECT_EQ(result.exitStatus, 130);
+    EXPECT_THAT(result.text, AllOf(Not(HasSubstr("at once")), isCancelled_));
 }
 
+/// The program then ends as after the whole operation, except for the status of another signal.
 TEST_F(ShellInterrupt, ComesTooLateOnceFilesAreWritten)
 {
-    TerminalProcess process = start("exec \"$0\" --log parameter revert .");
-    process.readUntil("completed_steps=3 ");
-    process.interrupt();
-    const std::string text = process.readAll();
-    const int status = process.wait();
-    ASSERT_TRUE(WIFEXITED(status)) << text;
-    EXPECT_EQ(WEXITSTATUS(status), 0);
-    EXPECT_THAT(text, AllOf(HasSubstr("Too late to cancel: files are being written.\n"),
-                            EndsWith("-xp\nReverted 1000 files.\n")));
-    EXPECT_EQ(countChanges(), 0U);
+    for (const auto &[signal, exitStatus] : {std::pair(SIGINT, 0), std::pair(SIGTERM, 143)})
+    {
+        const TerminalResult result =
+            interrupt("exec \"$0\" --log parameter revert .", "completed_steps=3 ", {signal});
+        EXPECT_EQ(result.exitStatus, exitStatus);
+        EXPECT_THAT(result.text, AllOf(HasSubstr("Too late to cancel: files are being written.\n"),
+                                       EndsWith("-xp\nReverted 1000 files.\n")));
+        EXPECT_EQ(countChanges(), 0U);
+        editAll();
+    }
 }
 
 TEST_F(ShellInterrupt, OfAnotherKindCancelsToo)
 {
     for (const int signal : {SIGTERM, SIGHUP})
     {
-        TerminalProcess process = start("exec \"$0\" --log progress revert .");
-        process.readUntil("Checkout Notify");
-        process.send(signal);
-        const std::string text = process.readAll();
-        const int status = process.wait();
-        ASSERT_TRUE(WIFEXITED(status)) << text;
-        EXPECT_EQ(WEXITSTATUS(status), 128 + signal);
-        EXPECT_THAT(text, AllOf(HasSubstr("Cancelling.\n"),
-                                EndsWith("vclink-shell: The operation was cancelled.\n")));
+        const TerminalResult result =
+            interrupt("exec \"$0\" --log progress revert .", "Checkout Notify", {signal});
+        EXPECT_EQ(result.exitStatus, 128 + signal);
+        EXPECT_THAT(result.text, isCancelled_);
         EXPECT_EQ(countChanges(), static_cast<std::size_t>(fileCount));
         EXPECT_FALSE(std::filesystem::exists(repository_ / ".git/index.lock"));
     }
 }
 
-TEST_F(ShellInterrupt, OfAnotherKindLetsTheProgramEndAsByItWhenItComesTooLate)
-{
-    TerminalProcess process = start("exec \"$0\" --log parameter revert .");
-    process.readUntil("completed_steps=3 ");
-    process.send(SIGTERM);
-    const std::string text = process.readAll();
-    const int status = process.wait();
-    ASSERT_TRUE(WIFEXITED(status)) << text;
-    EXPECT_EQ(WEXITSTATUS(status), 143);
-    EXPECT_THAT(text, AllOf(HasSubstr("Too late to cancel: files are being written.\n"),
-                            EndsWith("-xp\nReverted 1000 files.\n")));
-    EXPECT_EQ(countChanges(), 0U);
-}
-
 TEST_F(ShellInterrupt, IsIgnoredWhereItWasIgnoredBefore)
 {
-    TerminalProcess process = start("trap '' INT; exec \"$0\" --log progress revert .");
-    process.readUntil("Checkout Notify");
-    process.interrupt();
-    const std::string text = process.readAll();
-    const int status = process.wait();
-    ASSERT_TRUE(WIFEXITED(status)) << text;
-    EXPECT_EQ(WEXITSTATUS(status), 0);
+    const TerminalResult result =
+        interrupt("trap '' INT; exec \"$0\" --log progress revert .", "Checkout Notify");
+    EXPECT_EQ(result.exitStatus, 0) << result.text;
     EXPECT_EQ(countChanges(), 0U);
 }
 
 TEST_F(ShellInterrupt, EndsTheProgramBySignalWhereNothingCanBeCancelled)
 {
-    TerminalProcess process = start("exec \"$0\" status");
-    process.readUntil("modified");
-    process.interrupt();
-    process.readAll();
-    const int status = process.wait();
-    ASSERT_TRUE(WIFSIGNALED(status));
-    EXPECT_EQ(WTERMSIG(status), SIGINT);
+    EXPECT_EQ(interrupt("exec \"$0\" status", "modified").exitStatus, -SIGINT);
 }
 
 } // namespace

@@ -5,7 +5,6 @@
 #include <thread>
 
 #include <gmock/gmock.h>
-#include <sys/wait.h>
 
 #include "ShellRemoteFixture.hpp"
 #include "TerminalProcess.hpp"
@@ -36,12 +35,10 @@ class ShellRemoteInterrupt : public ShellRemoteFixture
         TerminalProcess process = start(arguments);
         process.readUntil(sign);
         process.interrupt();
-        const std::string text = process.readAll();
-        const int status = process.wait();
-        EXPECT_TRUE(WIFEXITED(status)) << text;
-        EXPECT_EQ(WEXITSTATUS(status), 130) << text;
-        EXPECT_THAT(text, EndsWith("vclink-shell: The operation was cancelled.\n"));
-        return text;
+        const TerminalResult result = process.end();
+        EXPECT_EQ(result.exitStatus, 130) << result.text;
+        EXPECT_THAT(result.text, EndsWith("vclink-shell: The operation was cancelled.\n"));
+        return result.text;
     }
 
     /// Gives the served repository 2 MB that can't be packed, and many names.
@@ -182,10 +179,7 @@ TEST_F(ShellSilentServer, IsGivenUpByASecondCtrlCAfterThreeSecondsAndLeftByAThir
     process.readUntil("vclink-shell: The operation makes no progress. The next Ctrl-C ends the "
                       "program at once.\n");
     process.interrupt();
-    process.readAll();
-    const int status = process.wait();
-    ASSERT_TRUE(WIFSIGNALED(status));
-    EXPECT_EQ(WTERMSIG(status), SIGINT);
+    EXPECT_EQ(process.end().exitStatus, -SIGINT);
 }
 
 TEST_F(ShellSilentServer, IsWaitedForWithAClockAndToldOfTheRequest)
@@ -203,10 +197,7 @@ TEST_F(ShellSilentServer, IsLeftByTheFirstCtrlCWhereNothingCanBeCancelled)
     TerminalProcess process = start({"heads", "origin"});
     waitForRequest();
     process.interrupt();
-    process.readAll();
-    const int status = process.wait();
-    ASSERT_TRUE(WIFSIGNALED(status));
-    EXPECT_EQ(WTERMSIG(status), SIGINT);
+    EXPECT_EQ(process.end().exitStatus, -SIGINT);
 }
 
 TEST_F(ShellRemoteInterrupt, EndsWithAFailureThatCameMeanwhile)
@@ -226,11 +217,9 @@ TEST_F(ShellRemoteInterrupt, EndsWithAFailureThatCameMeanwhile)
     process.interrupt();
     std::this_thread::sleep_for(std::chrono::seconds(1));
     interrupted.set_value();
-    const std::string text = process.readAll();
-    const int status = process.wait();
-    ASSERT_TRUE(WIFEXITED(status)) << text;
-    EXPECT_EQ(WEXITSTATUS(status), 130);
-    EXPECT_THAT(text, HasSubstr("vclink-shell: Git could not complete the operation"));
+    const TerminalResult result = process.end();
+    EXPECT_EQ(result.exitStatus, 130) << result.text;
+    EXPECT_THAT(result.text, HasSubstr("vclink-shell: Git could not complete the operation"));
 }
 
 } // namespace

@@ -1,9 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include <gmock/gmock.h>
-#include <sys/wait.h>
 
 #include "ShellMergeFixture.hpp"
-#include "TerminalProcess.hpp"
 #include "runOnTerminal.hpp"
 
 namespace vclink::test
@@ -230,7 +228,7 @@ class ShellInterruptOfBranches : public ShellMergeFixture
     }
 
     /// A script that runs the program, as "$0", and is interrupted when this has appeared.
-    int interrupt(const std::string &script, const std::string &sign, std::string &text) const
+    TerminalResult interrupt(const std::string &script, const std::string &sign) const
     {
         const std::string leaks =
             "LSAN_OPTIONS=print_suppressions=0:suppressions=" VCLINK_LEAK_SUPPRESSIONS;
@@ -238,18 +236,17 @@ class ShellInterruptOfBranches : public ShellMergeFixture
                                 repository_.path());
         process.readUntil(sign);
         process.interrupt();
-        text = process.readAll();
-        const int status = process.wait();
-        return WIFEXITED(status) ? WEXITSTATUS(status) : -1;
+        return process.end();
     }
 };
 
 TEST_F(ShellInterruptOfBranches, CancelsASwitchThatHasChangedNothing)
 {
     const std::string before = describe(repository_);
-    std::string text;
-    EXPECT_EQ(interrupt(R"(exec "$0" --log progress switch other)", "Checkout Notify", text), 130);
-    EXPECT_THAT(text, EndsWith("vclink-shell: The operation was cancelled.\n"));
+    const TerminalResult result =
+        interrupt(R"(exec "$0" --log progress switch other)", "Checkout Notify");
+    EXPECT_EQ(result.exitStatus, 130) << result.text;
+    EXPECT_THAT(result.text, EndsWith("vclink-shell: The operation was cancelled.\n"));
     EXPECT_EQ(repository_.line({"symbolic-ref", "HEAD"}), "refs/heads/main");
     EXPECT_EQ(describe(repository_), before);
     EXPECT_FALSE(std::filesystem::exists(repository_ / ".git/index.lock"));
@@ -259,10 +256,10 @@ TEST_F(ShellInterruptOfBranches, CancelsASwitchThatHasChangedNothing)
 
 TEST_F(ShellInterruptOfBranches, ComesTooLateOnceFilesAreWritten)
 {
-    std::string text;
-    EXPECT_EQ(interrupt(R"(exec "$0" --log parameter switch other)", "completed_steps=3 ", text),
-              0);
-    EXPECT_THAT(text, HasSubstr("Too late to cancel: files are being written.\n"));
+    const TerminalResult result =
+        interrupt(R"(exec "$0" --log parameter switch other)", "completed_steps=3 ");
+    EXPECT_EQ(result.exitStatus, 0) << result.text;
+    EXPECT_THAT(result.text, HasSubstr("Too late to cancel: files are being written.\n"));
     EXPECT_EQ(repository_.line({"symbolic-ref", "HEAD"}), "refs/heads/other");
     EXPECT_EQ(repository_.git({"status", "--porcelain"}), "");
 }
@@ -271,11 +268,13 @@ TEST_F(ShellInterruptOfBranches, CancelsAMergeThatHasChangedNothing)
 {
     commitFiles({{"a", "ours\n"}});
     const std::string before = describe(repository_);
-    std::string text;
-    EXPECT_EQ(interrupt(R"(exec "$0" --log progress merge other)", "Checkout Notify", text), 130);
-    EXPECT_THAT(text, HasSubstr("\nvclink-shell: \"other\" could not be merged into the current "
-                                "branch.\n"));
-    EXPECT_THAT(text, testing::Not(HasSubstr("in conflict")));
+    const TerminalResult result =
+        interrupt(R"(exec "$0" --log progress merge other)", "Checkout Notify");
+    EXPECT_EQ(result.exitStatus, 130) << result.text;
+    EXPECT_THAT(result.text,
+                HasSubstr("\nvclink-shell: \"other\" could not be merged into the current "
+                          "branch.\n"));
+    EXPECT_THAT(result.text, testing::Not(HasSubstr("in conflict")));
     EXPECT_EQ(describe(repository_), before);
     EXPECT_EQ(state(), "Normal\n");
 }

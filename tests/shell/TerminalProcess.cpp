@@ -62,14 +62,6 @@ void TerminalProcess::readUntil(const std::string &text)
     }
 }
 
-const std::string &TerminalProcess::readAll()
-{
-    while (readMore())
-    {
-    }
-    return text_;
-}
-
 bool TerminalProcess::readMore()
 {
     std::array<char, 4096> block{};
@@ -99,12 +91,15 @@ void TerminalProcess::send(int signal) const
         throw std::system_error(errno, std::generic_category(), "kill");
 }
 
-int TerminalProcess::wait()
+TerminalResult TerminalProcess::end()
 {
+    while (readMore())
+    {
+    }
     int status = 0;
     ::waitpid(process_, &status, 0);
     process_ = 0;
-    return status;
+    return {WIFSIGNALED(status) ? -WTERMSIG(status) : WEXITSTATUS(status), text_};
 }
 
 } // namespace vclink::test

@@ -10,6 +10,14 @@
 namespace vclink::test
 {
 
+struct TerminalResult
+{
+    /// the number of a signal that ended the program, negative
+    int exitStatus = 0;
+    /// all that appeared on the terminal, lines ending with a line feed
+    std::string text;
+};
+
 /// A program with a terminal of its own as its standard input, output and error, in a session of
 /// its own; killed at the end if it has not ended. What it writes is held up after some thousand
 /// bytes, until it is read.
@@ -27,19 +35,14 @@ class TerminalProcess
     /// Reads until this text has appeared, and no more than is already there.
     /// @throws std::runtime_error when it has not within a minute, or the program has ended
     void readUntil(const std::string &text);
-    /// Reads until nobody holds the terminal any more.
-    /// @return all that has appeared since the start
-    /// @throws std::runtime_error when that takes more than a minute
-    const std::string &readAll();
-
     /// Sends SIGINT to the program, and to nobody else.
     void interrupt() const;
     /// Sends a signal to the program, and to nobody else.
     void send(int signal) const;
 
-    /// Waits for the end of the program, after which readAll() has returned.
-    /// @return the status as waitpid() gives it
-    int wait();
+    /// Reads until nobody holds the terminal any more, and waits for the end of the program.
+    /// @throws std::runtime_error when the reading takes more than a minute
+    TerminalResult end();
 
   private:
     /// @return false at the end

@@ -4,16 +4,10 @@
 #include <string>
 #include <vector>
 
+#include "TerminalProcess.hpp"
+
 namespace vclink::test
 {
-
-struct TerminalResult
-{
-    /// -1 when the program did not end by itself
-    int exitStatus = -1;
-    /// all that appeared on the terminal, lines ending with a line feed
-    std::string text;
-};
 
 /// Runs a program to its end with a terminal of its own as its standard input, output and error.
 /// @param arguments the program, found in PATH unless it has a slash, and its arguments
