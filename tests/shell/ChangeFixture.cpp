@@ -27,17 +27,23 @@ void ChangeFixture::succeed(const std::vector<std::string> &arguments) const
     }
 }
 
-std::string ChangeFixture::refuse(const std::vector<std::string> &arguments) const
+std::string ChangeFixture::fail(const std::vector<std::string> &arguments) const
 {
-    const std::string before = everything();
     const Command command = shell(arguments).in(repository_.path());
     const CommandResult result = command.run();
     EXPECT_EQ(result.exitStatus, 1) << command.text();
     EXPECT_EQ(result.output, "") << command.text();
-    EXPECT_EQ(everything(), before) << command.text();
+    return result.errors;
+}
+
+std::string ChangeFixture::refuse(const std::vector<std::string> &arguments) const
+{
+    const std::string before = everything();
+    const std::string errors = fail(arguments);
+    EXPECT_EQ(everything(), before) << errors;
     const std::string program = "vclink-shell: ";
-    EXPECT_EQ(result.errors.substr(0, program.size()), program) << command.text();
-    return result.errors.substr(program.size());
+    EXPECT_EQ(errors.substr(0, program.size()), program);
+    return errors.substr(program.size());
 }
 
 std::map<std::string, std::string> ChangeFixture::letters() const

@@ -21,7 +21,11 @@ class ChangeFixture : public ShellFixture
     /// Runs the program in the repository. It has to end with 0, and to write nothing, as nobody is
     /// at a terminal, except how to restore what a revert discards.
     void succeed(const std::vector<std::string> &arguments) const;
-    /// Runs the program in the repository. It has to end with 1, and to leave everything as it was.
+    /// Runs the program in the repository. It has to end with 1, and to write nothing to standard
+    /// output.
+    /// @return what it wrote to standard error
+    std::string fail(const std::vector<std::string> &arguments) const;
+    /// As fail(). It has to leave everything as it was.
     /// @return what it wrote to standard error, without the program's name
     std::string refuse(const std::vector<std::string> &arguments) const;
 

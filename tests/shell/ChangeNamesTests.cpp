@@ -147,20 +147,13 @@ class ShellChangeOfNamesWithBackslash : public ChangeFixture
         repository_.write("other\\file", "");
         repository_.write("plain", "");
     }
-    std::string failIn(const std::vector<std::string> &arguments) const
-    {
-        const CommandResult result = runIn(repository_.path(), arguments);
-        EXPECT_EQ(result.exitStatus, 1);
-        EXPECT_EQ(result.output, "");
-        return result.errors;
-    }
     const std::string leftOut_ = ", because a backslash in a name is read as a slash:\n  "
                                  "\"folder\\\\c\"\n  \"other\\\\file\"\n";
 };
 
 TEST_F(ShellChangeOfNamesWithBackslash, TellsThatTheyWereNotAdded)
 {
-    EXPECT_EQ(failIn({"add", "."}), "vclink-shell: Others were not added" + leftOut_);
+    EXPECT_EQ(fail({"add", "."}), "vclink-shell: Others were not added" + leftOut_);
     EXPECT_THAT(letters(), ElementsAre(Pair("folder\\c", "??"), Pair("other\\file", "??"),
                                        Pair("plain", "A ")));
 }
@@ -168,7 +161,7 @@ TEST_F(ShellChangeOfNamesWithBackslash, TellsThatTheyWereNotAdded)
 TEST_F(ShellChangeOfNamesWithBackslash, TellsThatTheyWereNotRemoved)
 {
     repository_.commitAll("odd");
-    EXPECT_EQ(failIn({"rm", "."}), "vclink-shell: Not all were removed" + leftOut_);
+    EXPECT_EQ(fail({"rm", "."}), "vclink-shell: Not all were removed" + leftOut_);
     EXPECT_THAT(split(repository_.git({"ls-files", "-z"}), '\0'),
                 ElementsAre("folder\\c", "other\\file"));
 }
@@ -178,8 +171,7 @@ TEST_F(ShellChangeOfNamesWithBackslash, TellsThatTheyWereNotReverted)
     repository_.commitAll("odd");
     for (const std::string name : {"folder\\c", "other\\file", "plain"})
         repository_.write(name, "edited\n");
-    EXPECT_EQ(failIn({"revert", "--forget", "."}),
-              "vclink-shell: Not all were reverted" + leftOut_);
+    EXPECT_EQ(fail({"revert", "--forget", "."}), "vclink-shell: Not all were reverted" + leftOut_);
     EXPECT_THAT(letters(), ElementsAre(Pair("folder\\c", " M"), Pair("other\\file", " M")));
 }
 

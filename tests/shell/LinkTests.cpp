@@ -39,14 +39,6 @@ class ShellChangeOfLinks : public ChangeFixture
     {
         return fs::read_symlink(repository_ / name).string();
     }
-    /// What is told of files that were left out.
-    std::string fail(const std::vector<std::string> &arguments) const
-    {
-        const CommandResult result = runIn(repository_.path(), arguments);
-        EXPECT_EQ(result.exitStatus, 1);
-        EXPECT_EQ(result.output, "");
-        return result.errors;
-    }
     /// Leaves the link "link", or what `theirs` and `ours` lead to, in conflict.
     void makeLinkConflict(const std::string &theirs, const std::string &ours)
     {
