@@ -81,10 +81,6 @@ class EarlierTexts : public RemoteFixture
     std::vector<Silence> silencesOfBranches();
     std::vector<Silence> silencesOfRemotes();
 
-    upath pathOf(const std::string &name) const
-    {
-        return asPath(repository_.path().string() + '/' + name);
-    }
     LibGit2Recorder calls_;
 };
 

@@ -27,10 +27,6 @@ using namespace vclink::test;
 class DeletedWorkingFolder : public RemoteFixture
 {
   protected:
-    upath pathOf(const std::string &name) const
-    {
-        return asPath(repository_.path().string() + '/' + name);
-    }
     template <class Action> void withoutFolder(const Action &action) const
     {
         const NoWorkingFolder gone(folder().path());

@@ -84,11 +84,6 @@ class NulInTexts : public RemoteFixture
         repository_.write("new", "x");
     }
 
-    upath pathOf(const std::string &name) const
-    {
-        return asPath(repository_.path().string() + '/' + name);
-    }
-
     /// A call for each text that an operation on the working copy takes. The text is "main" and the
     /// like, as the operation takes it, with a NUL behind it.
     std::vector<NulCall> callsOfAdapter() const;

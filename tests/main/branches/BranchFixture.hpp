@@ -11,6 +11,7 @@
 #include "support/Failure.hpp"
 #include "support/RepositoryState.hpp"
 #include "support/strings.hpp"
+#include "support/text.hpp"
 #include "vclink/git/BranchManager.hpp"
 
 namespace vclink::test
@@ -31,6 +32,10 @@ class BranchFixture : public AdapterFixture
     git::BranchManager &branches() const
     {
         return *manager_;
+    }
+    upath pathOf(const std::string &name) const
+    {
+        return asPath(repository_.path().string() + '/' + name);
     }
     /// The id that git finds for a revision.
     std::string idOf(const std::string &revision) const;

@@ -67,7 +67,6 @@ TEST_F(OtherCase, OfAListedFileIsRefused)
     repository_.commitAll(writes("README", "other\n"), "both");
     diverge(writes("README", "ours\n") + writes("readme", "ours\n"),
             writes("README", "theirs\n") + writes("readme", "theirs\n"));
-    const auto pathOf = [this](const std::string &name) { return asPath(repository_ / name); };
     const auto expectRefused = [this](const std::function<void()> &operation)
     {
         const NothingChanges nothing(repository_);
