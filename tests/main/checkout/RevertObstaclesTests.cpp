@@ -69,6 +69,12 @@ class RevertObstacles : public StagingFixture
         git::CheckoutWatch watch(git::CheckoutKind::Revert, repository.get(), record);
         return git_checkout_index(repository.get(), nullptr, &record);
     }
+    void expectRefused(const std::vector<std::string> &names, const Failure &failure) const
+    {
+        const auto before = workingTreeOf(repository_);
+        EXPECT_EQ(failureOf([&] { revert(names); }), failure);
+        EXPECT_EQ(workingTreeOf(repository_), before);
+    }
     void expectNothingOutsideChanged() const
     {
         EXPECT_EQ(repository_.read("../outside/a"), "precious");
@@ -200,14 +206,7 @@ TEST_F(RevertObstacles, ThatLibGit2IsPastAreRefused)
     repository_.write("sub", "mine\n");
     repository_.write("sub-b", "edited\n");
     repository_.write("file-b", "edited\n");
-    const auto before = workingTreeOf(repository_);
-    const std::string text = "the untracked file 'sub' is in the way of the checkout";
-    EXPECT_EQ(failureOf(
-                  [this] {
-                      revert({"sub/inside", "sub-b", "file-b"});
-                  }),
-              (Failure{GIT_ECONFLICT, GIT_ERROR_CHECKOUT, text}));
-    EXPECT_EQ(workingTreeOf(repository_), before);
+    expectRefused({"sub/inside", "sub-b", "file-b"}, inTheWay("untracked file 'sub'"));
     repository_.remove("sub");
     repository_.remove("file");
     repository_.makeFolder("file");
@@ -221,14 +220,7 @@ TEST_F(RevertObstacles, FoldersWithFilesThatLibGit2IsPastAreRefused)
     repository_.remove("file");
     repository_.write("file/mine", "mine\n");
     repository_.write("file-b", "edited\n");
-    const auto before = workingTreeOf(repository_);
-    const std::string text = "the folder 'file' is in the way of the checkout";
-    EXPECT_EQ(failureOf(
-                  [this] {
-                      revert({"file", "file-b"});
-                  }),
-              (Failure{GIT_ECONFLICT, GIT_ERROR_CHECKOUT, text}));
-    EXPECT_EQ(workingTreeOf(repository_), before);
+    expectRefused({"file", "file-b"}, inTheWay("folder 'file'"));
 }
 
 TEST_F(RevertObstacles, AreFilesInThePlaceOfASubmodule)
@@ -238,14 +230,7 @@ TEST_F(RevertObstacles, AreFilesInThePlaceOfASubmodule)
     repository_.remove("module");
     repository_.write("module", "mine\n");
     repository_.write("file", "edited\n");
-    const auto before = workingTreeOf(repository_);
-    const std::string text = "the untracked file 'module' is in the way of the checkout";
-    EXPECT_EQ(failureOf(
-                  [this] {
-                      revert({"file", "module"});
-                  }),
-              (Failure{GIT_ECONFLICT, GIT_ERROR_CHECKOUT, text}));
-    EXPECT_EQ(workingTreeOf(repository_), before);
+    expectRefused({"file", "module"}, inTheWay("untracked file 'module'"));
 }
 
 /// The states are not known then. The index has no file in conflict.
