@@ -294,11 +294,7 @@ TEST_F(AddFiles, TakesFilesWhoseNamesNeedAnEscapeAndThatWereFolders)
 
 TEST_F(AddFiles, RefusesASubmoduleThatGitKnows)
 {
-    auto inner = makeRepository("inner");
-    inner.write("file", "x");
-    inner.commitAll("first");
-    repository_.git({"submodule", "--quiet", "add", inner.path().string(), "module"});
-    repository_.commit("second");
+    addModule();
     repository_.write("module/new", "x");
     const NothingChanges nothing(repository_);
     expectRefuses({"module"}, {"module"});

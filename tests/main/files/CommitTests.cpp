@@ -148,11 +148,7 @@ TEST_F(Commit, HoldsLineEndingsAsTheAttributesWantThem)
 
 TEST_F(Commit, HoldsTheCommitThatASubmoduleIsAt)
 {
-    auto source = makeRepository("source");
-    source.write("inner", "x");
-    source.commitAll("first");
-    repository_.git({"submodule", "--quiet", "add", source.path().string(), "module"});
-    repository_.commit("with a module");
+    addModule();
     GitRepository module(repository_ / "module");
     const std::string moved = module.commit("in the module");
     commit();

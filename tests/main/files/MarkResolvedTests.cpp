@@ -198,12 +198,7 @@ TEST_F(MarkResolved, LeavesFilesThatASparseCheckoutLeavesOut)
 
 TEST_F(MarkResolved, TakesTheNewCommitOfASubmodule)
 {
-    auto inner = makeRepository("inner");
-    inner.write("file", "x");
-    inner.commitAll("first");
-    inner.commit("second");
-    repository_.git({"submodule", "--quiet", "add", inner.path().string(), "module"});
-    repository_.commit("second");
+    addModule();
     GitRepository(repository_ / "module").git({"checkout", "--quiet", "HEAD~1"});
     const RepositoryState expected = stateAfterGit({{"add", "module"}});
     markResolved("module");

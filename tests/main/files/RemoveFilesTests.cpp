@@ -21,28 +21,9 @@ using namespace vclink::test;
 class RemoveFiles : public StagingFixture
 {
   protected:
-    static void expectRefuses(const std::function<void()> &action)
-    {
-        try
-        {
-            action();
-            ADD_FAILURE() << "no exception";
-        }
-        catch (const TagException<NoFilesToRemove> &exception)
-        {
-            const vclink::exception::SourceControlException &base = exception;
-            EXPECT_EQ(typeid(base), typeid(TagException<NoFilesToRemove>));
-            EXPECT_EQ(exception.GetBaseMsgIDObj().getKey(), "NoFilesToRemove");
-            EXPECT_EQ(exception.GetBaseMsgIDObj().getCatalogue(), "shared_vclink:git");
-            EXPECT_TRUE(exception.GetBaseMsgIDObj().getArguments().empty());
-            EXPECT_EQ(asUtf8(exception.GetUnicodeMessageTxt()),
-                      "There are no files to remove. Nothing was changed.");
-        }
-    }
-
     void expectRefuses(const std::vector<std::string> &names) const
     {
-        expectRefuses([&] { remove(names); });
+        expectRefusal<NoFilesToRemove>({}, [&] { remove(names); });
     }
 };
 
@@ -120,9 +101,9 @@ TEST_F(RemoveFiles, DoesNotWriteTheFileAndRefusesToRemoveItASecondTime)
 TEST_F(RemoveFiles, RefusesAnEmptyListAndOpensNothingForIt)
 {
     const NothingChanges nothing(repository_);
-    expectRefuses(std::vector<std::string>());
+    expectRefuses({});
     const auto adapter = makeAdapter(folder() / "missing");
-    expectRefuses([&] { adapter->removeFiles({}); });
+    expectRefusal<NoFilesToRemove>({}, [&] { adapter->removeFiles({}); });
 }
 
 TEST_F(RemoveFiles, RefusesAListOfWhichNothingMatchesOrIsStillTracked)
@@ -224,11 +205,7 @@ TEST_F(RemoveFiles, TakesTheFilesOfAFolderWhereAFileStandsNow)
 
 TEST_F(RemoveFiles, RemovesASubmoduleAndLeavesItsFiles)
 {
-    auto inner = makeRepository("inner");
-    inner.write("file", "x");
-    inner.commitAll("first");
-    repository_.git({"submodule", "--quiet", "add", inner.path().string(), "module"});
-    repository_.commit("second");
+    addModule();
     const RepositoryState expected = stateAfterGit({{"rm", "--cached", "module"}});
     remove({"module"});
     EXPECT_EQ(indexOf(repository_), expected.index);

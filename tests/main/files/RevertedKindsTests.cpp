@@ -133,12 +133,7 @@ TEST_F(RevertedKinds, LeavesALinkThatStandsNowhereInTheWay)
 
 TEST_F(RevertedKinds, PutsASubmodulesCommitBackIntoTheIndex)
 {
-    auto inner = makeRepository("inner");
-    inner.write("file", "x");
-    inner.commitAll("first");
-    inner.commit("second");
-    repository_.git({"submodule", "--quiet", "add", inner.path().string(), "module"});
-    repository_.commit("second");
+    addModule();
     const RepositoryState before = stateOf(repository_);
     const GitRepository module(repository_ / "module");
     module.git({"checkout", "--quiet", "HEAD~1"});

@@ -114,4 +114,14 @@ void StagingFixture::beginMerge(const std::vector<std::string> &names)
         ASSERT_EQ(states(repository_, {name}), (States{{name, "InConflict"}}));
 }
 
+void StagingFixture::addModule()
+{
+    auto inner = makeRepository("inner");
+    inner.write("file", "x");
+    inner.commitAll("first");
+    inner.commit("second");
+    repository_.git({"submodule", "--quiet", "add", inner.path().string(), "module"});
+    repository_.commit("second");
+}
+
 } // namespace vclink::test

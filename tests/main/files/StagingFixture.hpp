@@ -20,7 +20,7 @@ namespace vclink::test
 {
 
 /// Expects that `action` throws exactly the class of the identifier, with a report of these paths
-/// as its argument.
+/// as its argument, or with none if there are none.
 template <class Tag>
 void expectRefusal(const std::vector<std::string> &paths, const std::function<void()> &action)
 {
@@ -38,8 +38,9 @@ void expectRefusal(const std::vector<std::string> &paths, const std::function<vo
         EXPECT_EQ(typeid(base), typeid(git::TagException<Tag>));
         const auto &message = exception.GetBaseMsgIDObj();
         EXPECT_EQ(message.getCatalogue(), "shared_vclink:git");
-        EXPECT_EQ(asUtf8(boost::get<ustring>(message.getArguments().at(0))), asUtf8(report));
-        EXPECT_EQ(message.getArguments().size(), 1U);
+        EXPECT_EQ(message.getArguments().size(), paths.empty() ? 0U : 1U);
+        for (const auto &argument : message.getArguments())
+            EXPECT_EQ(asUtf8(boost::get<ustring>(argument)), asUtf8(report));
     }
 }
 
@@ -76,6 +77,9 @@ class StagingFixture : public AdapterFixture
 
     /// Begins a merge that changes each of these on both sides and stops at the conflicts.
     void beginMerge(const std::vector<std::string> &names);
+
+    /// Commits the submodule "module", which has the file "file" and two commits.
+    void addModule();
 
     GitRepository repository_ = makeRepository();
 };
