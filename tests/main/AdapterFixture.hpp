@@ -21,6 +21,9 @@ namespace vclink::test
 /// States by name relative to a root, both as text, so that a failure is readable.
 using States = std::map<std::string, std::string>;
 
+inline const std::string notAnIndex =
+    "this is no index, and long enough to be told from an empty one";
+
 /// The name of a state, "Modified" and so on.
 std::string nameOf(FileState state);
 

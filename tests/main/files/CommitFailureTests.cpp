@@ -18,7 +18,6 @@ using testing::StartsWith;
 using namespace vclink::test;
 
 const std::string missingId = "1234567890123456789012345678901234567890";
-const std::string notAnIndex = "this is no index, and long enough to be told from an empty one";
 
 /// A working copy in which "file" is changed, "other" deleted and "new" untracked.
 class CommitFailure : public CommitFixture

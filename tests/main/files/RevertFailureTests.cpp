@@ -39,8 +39,7 @@ class RevertFailure : public StagingFixture
 
 TEST_F(RevertFailure, OfABrokenIndexChangesNothing)
 {
-    repository_.write(".git/index",
-                      "this is no index, and long enough to be told from an empty one");
+    repository_.write(".git/index", notAnIndex);
     const auto index = stampOf(path(".git/index"));
     const auto tree = workingTreeOf(repository_);
     EXPECT_EQ(failureOf([this] { revert({"file"}); }),

@@ -250,8 +250,7 @@ TEST_F(StagingFailure, OfABrokenConfigurationIsRaisedAndChangesNothing)
 /// The state query gives no states then, so that there is nothing to do for it.
 TEST_F(StagingFailure, OfABrokenIndexLeavesItAsItIs)
 {
-    repository_.write(".git/index",
-                      "this is no index, and long enough to be told from an empty one");
+    repository_.write(".git/index", notAnIndex);
     const auto index = stampOf(repository_ / ".git/index");
     EXPECT_NO_THROW(add({"new"}));
     EXPECT_THROW(remove({"file"}), TagException<NoFilesToRemove>);

@@ -150,8 +150,7 @@ TEST_P(StatusOf, IsAnEmptyMapAndNoExceptionWaits)
 }
 
 const BrokenPart brokenParts[]{
-    {{"ABrokenIndex"},
-     writes(".git/index", "this is no index, and long enough to be told from an empty one")},
+    {{"ABrokenIndex"}, writes(".git/index", notAnIndex)},
     {{"ATruncatedIndex"}, truncateIndex},
     {{"ASplitIndex"}, runsGit({"update-index", "--split-index"})},
     {{"ASparseIndex"}, makeIndexSparse},
