@@ -19,7 +19,6 @@ namespace
 
 namespace fs = std::filesystem;
 using git::acquire;
-using git::OwnedHandle;
 
 /// Without AUTO_MERGE, which git leaves where it ends a merge.
 constexpr std::array filesUnderWay{
