@@ -28,7 +28,7 @@ using namespace vclink::test;
 using MergeObstacles = ObstacleFixture;
 
 /// What a merge refuses, and the conflicts it comes to without.
-struct RefusedMerge
+struct MergeRefusal
 {
     std::string name;
     Change ours;
@@ -37,12 +37,12 @@ struct RefusedMerge
     std::vector<std::string> conflicts{};
 };
 
-std::ostream &operator<<(std::ostream &stream, const RefusedMerge &merge)
+std::ostream &operator<<(std::ostream &stream, const MergeRefusal &merge)
 {
     return stream << merge.name;
 }
 
-class RefusedMerges : public MergeObstacles, public testing::WithParamInterface<RefusedMerge>
+class RefusedMerges : public MergeObstacles, public testing::WithParamInterface<MergeRefusal>
 {
 };
 
@@ -59,7 +59,7 @@ TEST_P(RefusedMerges, ChangeNothingAndGoWellWithoutTheObstacle)
 const Change oursElsewhere = writes("ours", "x");
 const Change theirsElsewhere = writes("theirs", "x");
 
-const std::vector<RefusedMerge> refusedMerges{
+const std::vector<MergeRefusal> refusedMerges{
     {"AreOfUntrackedFilesBelowATrackedFolder",
      oursElsewhere,
      writes("d/new", "theirs\n"),

@@ -46,7 +46,7 @@ class SwitchObstacles : public ObstacleFixture
 };
 
 /// What a switch and a fast-forward refuse.
-struct RefusedSwitch
+struct SwitchRefusal
 {
     std::string name;
     Change branch;
@@ -55,12 +55,12 @@ struct RefusedSwitch
     std::string sibling = "file-1";
 };
 
-std::ostream &operator<<(std::ostream &stream, const RefusedSwitch &refused)
+std::ostream &operator<<(std::ostream &stream, const SwitchRefusal &refused)
 {
     return stream << refused.name;
 }
 
-class RefusedSwitches : public SwitchObstacles, public testing::WithParamInterface<RefusedSwitch>
+class RefusedSwitches : public SwitchObstacles, public testing::WithParamInterface<SwitchRefusal>
 {
 };
 
@@ -80,7 +80,7 @@ Failure missing(const std::string &what)
                    "--staged --worktree' first");
 }
 
-const std::vector<RefusedSwitch> refusedSwitches{
+const std::vector<SwitchRefusal> refusedSwitches{
     {"AreOfFifosSocketsAndDevices",
      writesEach({"d/f", "d/new", "n/a"}, "theirs\n") + removes("d/g"),
      {{removes("d/f") + makesFifo("d/f"), inTheWay("FIFO, socket or device 'd/f'")},

@@ -20,7 +20,7 @@ namespace
 using testing::HasSubstr;
 using namespace vclink::test;
 
-struct SettingCase
+struct AccessCase
 {
     const char *sentence;
     /// in the section [core]
@@ -30,7 +30,7 @@ struct SettingCase
     bool isRefusedByGit = false;
 };
 
-void PrintTo(const SettingCase &row, std::ostream *stream)
+void PrintTo(const AccessCase &row, std::ostream *stream)
 {
     *stream << row.line;
 }
@@ -38,7 +38,7 @@ void PrintTo(const SettingCase &row, std::ostream *stream)
 const std::string binaryText("a\0\nb\r\n", 6);
 
 /// Settings with which libgit2 would convert binary files, too, or fail halfway.
-class UnreadableSettings : public MergeFixture, public testing::WithParamInterface<SettingCase>
+class UnreadableSettings : public MergeFixture, public testing::WithParamInterface<AccessCase>
 {
   protected:
     UnreadableSettings()
@@ -132,7 +132,7 @@ TEST_P(UnreadableSettings, LeaveStatesAndRemovalsAlone)
     EXPECT_NO_THROW(adapter_->removeFiles(namesIn(repository_, {"other"})));
 }
 
-const SettingCase unreadable[] = {
+const AccessCase unreadable[] = {
     {"Eol", "eol = auto", "core.eol is 'auto', which libgit2 cannot read: set it to lf, crlf"},
     {"TrueEol", "eol = true", "core.eol is 'true'"},
     {"InputEol", "eol = input", "core.eol is 'input'"},
@@ -169,7 +169,7 @@ TEST_P(ReadableSettings, StopNothing)
     EXPECT_EQ(repository_.git({"show", "HEAD:r.bin"}), binaryText);
 }
 
-const SettingCase readable[] = {
+const AccessCase readable[] = {
     {"NoEol", "eol = false"},
     {"UpperCaseEol", "eol = CRLF"},
     {"NativeEol", "eol = native"},

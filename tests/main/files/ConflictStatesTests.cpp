@@ -61,11 +61,11 @@ struct ConflictRow : Sentence
     std::string letters;
 };
 
-class ConflictState : public ConflictStates, public testing::WithParamInterface<ConflictRow>
+class EachConflict : public ConflictStates, public testing::WithParamInterface<ConflictRow>
 {
 };
 
-TEST_P(ConflictState, IsInConflict)
+TEST_P(EachConflict, IsInConflict)
 {
     ASSERT_EQ(merge(GetParam().base, GetParam().ours, GetParam().theirs), GetParam().letters);
     expectConflict();
@@ -78,7 +78,7 @@ const ConflictRow conflictRows[]{
     {{"WeDeleted"}, "base\n", {}, "theirs\n", "DU"},
 };
 
-INSTANTIATE_TEST_SUITE_P(OfAFileThat, ConflictState, testing::ValuesIn(conflictRows),
+INSTANTIATE_TEST_SUITE_P(OfAFileThat, EachConflict, testing::ValuesIn(conflictRows),
                          testing::PrintToStringParamName());
 
 TEST_F(ConflictStates, StandsWhateverIsOnDiskUntilTheFileIsStaged)

@@ -253,11 +253,11 @@ struct WorkInTheWay : Sentence
     bool isHeadNoted;
 };
 
-class RefusedMerge : public MergeFixture, public testing::WithParamInterface<WorkInTheWay>
+class RefusedThreeWayMerge : public MergeFixture, public testing::WithParamInterface<WorkInTheWay>
 {
 };
 
-TEST_P(RefusedMerge, AsInGitKeeps)
+TEST_P(RefusedThreeWayMerge, AsInGitKeeps)
 {
     diverge(writes("ours", "x"), writes("file", "theirs\n") + writes("new", "theirs\n"));
     GetParam().mine(repository_);
@@ -289,7 +289,7 @@ const WorkInTheWay worksInTheWay[]{
      false},
 };
 
-INSTANTIATE_TEST_SUITE_P(ThreeWays, RefusedMerge, testing::ValuesIn(worksInTheWay),
+INSTANTIATE_TEST_SUITE_P(ThreeWays, RefusedThreeWayMerge, testing::ValuesIn(worksInTheWay),
                          testing::PrintToStringParamName());
 
 } // namespace
