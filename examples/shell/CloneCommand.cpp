@@ -91,7 +91,7 @@ std::filesystem::path withoutLinks(const std::filesystem::path &folder)
 }
 
 /// The standard library opens a descriptor for each level of what it removes. On most systems a
-/// process starts with a limit of 1,024, and may raise it.
+/// process starts with a limit of 1,024, and can ask for more.
 void allowAllDescriptors()
 {
     rlimit limit = {};
