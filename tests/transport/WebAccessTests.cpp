@@ -18,8 +18,8 @@
 namespace
 {
 
-using Site = WebServer::Site;
 using namespace vclink::test;
+using Site = WebServer::Site;
 
 class WebTest : public ServerOfTheSuite<WebServer>, public RemoteFixture
 {
