@@ -45,7 +45,7 @@ class AbiReport : public GitFixture
     void build(const std::string &plain, const std::string &slots, const std::string &fields) const
     {
         std::ofstream(folder() / "include" / "Sample.hpp")
-            << "struct __attribute__((visibility(\"default\"))) Sample\n{\n"
+            << boost_ << "struct __attribute__((visibility(\"default\"))) Sample\n{\n"
             << slots << "\nvirtual ~Sample();\nint " << plain << "() const;\n"
             << fields << "\n};\n";
         std::ofstream(folder() / "Sample.cpp")
@@ -56,6 +56,13 @@ class AbiReport : public GitFixture
         runToSuccess(Command({VCLINK_COMPILER, "-g", "-fPIC", "-shared", "-fvisibility=hidden",
                               "-o", library(), "Sample.cpp"})
                          .in(folder().path()));
+    }
+
+    /// Puts a class of Boost before the library's, with a detail that has these members.
+    void useBoost(const std::string &fields)
+    {
+        boost_ = "namespace boost { namespace sample_detail { struct Storage { " + fields +
+                 " }; }\nclass holder { sample_detail::Storage storage_; }; }\n";
     }
 
     Command command(std::vector<std::string> options) const
@@ -76,6 +83,8 @@ class AbiReport : public GitFixture
     {
         return (folder() / "libsample.so").string();
     }
+
+    std::string boost_;
 };
 
 TEST_F(AbiReport, HasNothingToSayOfTheSameLibrary)
@@ -99,6 +108,31 @@ TEST_F(AbiReport, FindsAnAddedMember)
     const auto changed = report();
     EXPECT_EQ(changed.exitStatus, 1);
     EXPECT_THAT(changed.output, HasSubstr("'long int more'"));
+}
+
+TEST_F(AbiReport, IgnoresAnotherDetailOfBoost)
+{
+    const auto *slots = "virtual void one() = 0; virtual void two() = 0;";
+    useBoost("char data[8];");
+    build("first", slots, "boost::holder value;");
+    runToSuccess(command({"--renew"}));
+    useBoost("unsigned char bytes[8];");
+    build("first", slots, "boost::holder value;");
+    const auto same = report();
+    EXPECT_EQ(same.exitStatus, 0) << same.output << same.errors;
+}
+
+TEST_F(AbiReport, FindsAnotherSizeOfADetailOfBoost)
+{
+    const auto *slots = "virtual void one() = 0; virtual void two() = 0;";
+    useBoost("char data[8];");
+    build("first", slots, "boost::holder value;");
+    runToSuccess(command({"--renew"}));
+    useBoost("char data[16];");
+    build("first", slots, "boost::holder value;");
+    const auto changed = report();
+    EXPECT_EQ(changed.exitStatus, 1);
+    EXPECT_THAT(changed.output, HasSubstr("type size changed from 128 to 192"));
 }
 
 TEST_F(AbiReport, FindsALostAndANewSymbol)
