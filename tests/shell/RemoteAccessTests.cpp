@@ -6,6 +6,7 @@
 #include <gmock/gmock.h>
 
 #include "ShellFixture.hpp"
+#include "support/libgit2Release.hpp"
 #include "transport/ServerOfTheSuite.hpp"
 #include "transport/SshAgent.hpp"
 #include "transport/SshServer.hpp"
@@ -21,7 +22,10 @@ using testing::HasSubstr;
 using testing::Not;
 using testing::StartsWith;
 
-const std::string leakOptions = "print_suppressions=0:suppressions=" VCLINK_SSH_LEAK_SUPPRESSIONS;
+const std::string leakOptions =
+    libgit2_release::losesKnownHosts
+        ? "print_suppressions=0:suppressions=" VCLINK_KNOWN_HOSTS_LEAK_SUPPRESSIONS
+        : "print_suppressions=0:suppressions=" VCLINK_SSH_LEAK_SUPPRESSIONS;
 
 template <class Server> class AccessTest : public ServerOfTheSuite<Server>, public ShellFixture
 {

@@ -2,9 +2,9 @@
 #include "libgit2Release.hpp"
 
 /// The leak sanitizer calls it. When libgit2 up to 1.5 looks for submodules in a configuration, it
-/// does not release a regular expression that matched nothing. For each ssh connection it does not
-/// release the list of known hosts, and libssh2 1.10 not what a server says before it asks for the
-/// user. Weak, so that a program can have its own.
+/// does not release a regular expression that matched nothing. libssh2, up to 1.11 at least, does
+/// not release what a server says before it asks for the user. Weak, so that a program can have its
+/// own.
 extern "C" __attribute__((visibility("default"), weak)) const char *
 leakSuppressions() __asm__("__lsan_default_suppressions");
 

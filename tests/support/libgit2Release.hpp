@@ -22,6 +22,9 @@ constexpr bool isSince(int major, int minor)
 /// Looking a remote up loses memory, more with every entry of the configuration.
 constexpr bool losesMemory = !isSince(1, 6);
 
+/// An ssh connection loses the list of known hosts and the paths of its file.
+constexpr bool losesKnownHosts = !isSince(1, 8);
+
 /// A lock of a configuration file that is not committed also closes the file.
 constexpr bool closesLockedFile = !isSince(1, 8);
 
