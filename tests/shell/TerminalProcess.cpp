@@ -37,6 +37,9 @@ TerminalProcess::TerminalProcess(std::vector<std::string> arguments,
         throw std::system_error(errno, std::generic_category(), "forkpty");
     if (process_ == 0)
     {
+        // Whoever runs the tests in the background has these ignored.
+        for (const int signal : {SIGINT, SIGQUIT, SIGTERM, SIGHUP})
+            ::signal(signal, SIG_DFL);
         if (folder.empty() || ::chdir(folder.c_str()) == 0)
             ::execvp(pointers[0], pointers.data());
         ::_exit(127);
