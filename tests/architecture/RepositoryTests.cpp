@@ -77,4 +77,9 @@ TEST_F(Repository, LetsNoCommandInheritAFileThatTheLibraryReads)
     EXPECT_THAT(findFileStreams(tree), IsEmpty());
 }
 
+TEST_F(Repository, HasNoLongFile)
+{
+    EXPECT_THAT(findLongFiles(tree), IsEmpty());
+}
+
 } // namespace

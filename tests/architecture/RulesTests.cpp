@@ -290,4 +290,11 @@ TEST(FileStreams, AreNotForTheLibrary)
                 IsEmpty());
 }
 
+TEST(LongFiles, AreFound)
+{
+    EXPECT_THAT(findLongFiles(makeTreeWith("util/lines.cpp", std::string(400, '\n'))),
+                ElementsAre("util/lines.cpp has 400 lines"));
+    EXPECT_THAT(findLongFiles(makeTreeWith("util/lines.cpp", std::string(399, '\n'))), IsEmpty());
+}
+
 } // namespace

@@ -299,4 +299,17 @@ Findings findFileStreams(const SourceTree &tree)
     return findings;
 }
 
+Findings findLongFiles(const SourceTree &tree)
+{
+    constexpr auto limit = 400;
+    Findings findings;
+    for (const auto &[file, content] : tree)
+    {
+        const auto lines = std::count(content.begin(), content.end(), '\n');
+        if (lines >= limit)
+            findings.push_back(file + " has " + std::to_string(lines) + " lines");
+    }
+    return findings;
+}
+
 } // namespace vclink::test

@@ -45,4 +45,7 @@ Findings findLineMacros(const SourceTree &tree);
 /// The library opens no file as a stream: a command of another thread would inherit the descriptor.
 Findings findFileStreams(const SourceTree &tree);
 
+/// A file has less than 400 lines.
+Findings findLongFiles(const SourceTree &tree);
+
 } // namespace vclink::test
