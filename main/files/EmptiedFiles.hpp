@@ -5,7 +5,7 @@
 
 #include <git2/types.h>
 
-#include "main/files/ChangedFiles.hpp"
+#include "util/repository/ChangedFiles.hpp"
 
 namespace vclink::git
 {

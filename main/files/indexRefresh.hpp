@@ -6,8 +6,8 @@
 
 #include <git2/types.h>
 
-#include "main/files/ChangedFiles.hpp"
 #include "main/files/HeldEntries.hpp"
+#include "util/repository/ChangedFiles.hpp"
 
 namespace vclink::git
 {

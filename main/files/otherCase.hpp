@@ -4,7 +4,7 @@
 #include <git2/strarray.h>
 #include <git2/types.h>
 
-#include "main/files/ChangedFiles.hpp"
+#include "util/repository/ChangedFiles.hpp"
 
 namespace vclink::git
 {

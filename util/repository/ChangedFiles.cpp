@@ -1,9 +1,11 @@
 // SPDX-License-Identifier: MIT
-#include "main/files/ChangedFiles.hpp"
+#include "util/repository/ChangedFiles.hpp"
 
+#include <algorithm>
 #include <cerrno>
 #include <cstddef>
 #include <cstdint>
+#include <cstring>
 #include <optional>
 #include <string_view>
 #include <utility>
@@ -51,15 +53,19 @@ bool isEmptyButNotNoted(const git_index_entry &entry, const struct stat &status)
     return isEmptyFile(status) && !isEmptyBlob(entry.id);
 }
 
-bool isAsNoted(const git_index_entry &entry, const struct stat &status)
+bool isAsNoted(const git_index_entry &entry, std::uint32_t mode, const struct stat &status)
 {
-    return entry.mode == modeOf(status) &&
-           entry.file_size == static_cast<std::uint32_t>(status.st_size) &&
+    return entry.mode == mode && entry.file_size == static_cast<std::uint32_t>(status.st_size) &&
            isSameTime(entry.mtime, status.st_mtim) && isSameTime(entry.ctime, status.st_ctim) &&
            entry.ino == static_cast<std::uint32_t>(status.st_ino) &&
            entry.uid == static_cast<std::uint32_t>(status.st_uid) &&
            entry.gid == static_cast<std::uint32_t>(status.st_gid) &&
            !isEmptyButNotNoted(entry, status);
+}
+
+bool isNormal(const git_index_entry &entry)
+{
+    return GIT_INDEX_ENTRY_STAGE(&entry) == GIT_INDEX_STAGE_NORMAL;
 }
 
 bool isCompared(const git_index_entry &entry)
@@ -80,13 +86,13 @@ std::int32_t timeOf(git_index *index)
 
 /// Returns 0 or the error. After an error tries once more, so that a temporary one does not hide a
 /// file.
-int readStatus(const std::string &path, struct stat &status)
+int readStatus(const char *path, struct stat &status)
 {
-    if (::lstat(path.c_str(), &status) == 0)
+    if (::lstat(path, &status) == 0)
     {
         return 0;
     }
-    if (errno != ENOENT && errno != ENOTDIR && ::lstat(path.c_str(), &status) == 0)
+    if (errno != ENOENT && errno != ENOTDIR && ::lstat(path, &status) == 0)
     {
         return 0;
     }
@@ -97,20 +103,20 @@ int readStatus(const std::string &path, struct stat &status)
 class Look
 {
   public:
-    Look(std::string workdir, git_index *index)
-        : path_(std::move(workdir)), rootSize_(path_.size()), indexTime_(timeOf(index))
+    Look(std::string_view workdir, git_index *index)
+        : path_(workdir.begin(), workdir.end()), rootSize_(path_.size()), indexTime_(timeOf(index))
     {
     }
 
     std::optional<ChangedFile> at(const git_index_entry &entry)
     {
-        const std::string_view path = entry.path;
-        dependOnOrder_ = dependOnOrder_ || (isLastNormal_ && path == last_);
-        last_ = path;
-        isLastNormal_ = GIT_INDEX_ENTRY_STAGE(&entry) == GIT_INDEX_STAGE_NORMAL;
-        if (!isLastNormal_)
+        const git_index_entry *const last = std::exchange(last_, &entry);
+        if (!isNormal(entry))
         {
-            dependOnOrder_ = dependOnOrder_ || isForAttributes(entry.path);
+            // The entry without a conflict comes first.
+            const bool hasBoth =
+                last != nullptr && isNormal(*last) && std::strcmp(last->path, entry.path) == 0;
+            dependOnOrder_ = dependOnOrder_ || hasBoth || isForAttributes(entry.path);
             return std::nullopt;
         }
         return isCompared(entry) && entry.mode != GIT_FILEMODE_COMMIT ? compare(entry)
@@ -125,14 +131,12 @@ class Look
   private:
     std::optional<ChangedFile> compare(const git_index_entry &entry)
     {
-        struct stat status = {};
-        path_.replace(rootSize_, std::string::npos, last_);
-        const int error = readStatus(path_, status);
+        const int error = readStatus(pathOf(entry), status_);
         if (error == ENOENT || error == ENOTDIR)
         {
             return ChangedFile{entry.path, GIT_FILEMODE_UNREADABLE, isFile(entry.mode), false};
         }
-        const std::uint32_t mode = modeOf(status);
+        const std::uint32_t mode = modeOf(status_);
         if (error != 0 || mode == GIT_FILEMODE_UNREADABLE)
         {
             dependOnOrder_ = dependOnOrder_ || isForAttributes(entry.path);
@@ -140,19 +144,28 @@ class Look
         }
         // What is in a file with attributes decides about other files too.
         const bool isDoubtful = entry.mtime.seconds >= indexTime_ && isForAttributes(entry.path);
-        if (isAsNoted(entry, status) && !isDoubtful)
+        if (isAsNoted(entry, mode, status_) && !isDoubtful)
         {
             return std::nullopt;
         }
         return ChangedFile{entry.path, mode, isFile(mode) && isFile(entry.mode),
-                           isEmptyFile(status)};
+                           isEmptyFile(status_)};
     }
 
-    std::string path_;
+    /// In a buffer that only grows, because this runs for each file.
+    const char *pathOf(const git_index_entry &entry)
+    {
+        const std::size_t size = std::strlen(entry.path) + 1;
+        path_.resize(std::max(path_.size(), rootSize_ + size));
+        std::memcpy(path_.data() + rootSize_, entry.path, size);
+        return path_.data();
+    }
+
+    std::vector<char> path_;
     std::size_t rootSize_;
+    struct stat status_ = {};
     std::int32_t indexTime_;
-    std::string_view last_;
-    bool isLastNormal_ = false;
+    const git_index_entry *last_ = nullptr;
     bool dependOnOrder_ = false;
 };
 
