@@ -17,6 +17,7 @@
 #include "main/checkout/overlookedEdits.hpp"
 #include "main/checkout/severalBases.hpp"
 #include "main/mergeState/MergeBases.hpp"
+#include "util/repository/ChangedFiles.hpp"
 #include "util/repository/fatalPatterns.hpp"
 #include "util/repository/repository.hpp"
 
@@ -149,7 +150,9 @@ void CheckoutWatch::lookBeforeMerge(const git_oid *theirs)
     const std::vector<OwnedHandle<git_tree>> bases =
         readTrees(repository_, MergeBases(repository_, &ours, theirs));
     const std::vector<std::string> mounts = mountPointsBelow(root_);
-    Finding first = firstOf(findUnmerged(copy), findHiddenEdit(copy));
+    const ChangedFiles changed(repository_, copy.index());
+    Finding first = changed.hasConflicts() ? findUnmerged(copy) : Finding();
+    first = firstOf(first, firstOf(findHiddenEdit(copy), findEditBeforeMerge(copy, changed)));
     Finding yielding;
     bool mayBeRenamed = false;
     for (const OwnedHandle<git_tree> &before : bases)

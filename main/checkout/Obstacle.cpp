@@ -47,6 +47,16 @@ Obstacle stagedChangesOf(const std::string &name)
     return {name, "the staged changes of '" + name + "' would be lost in the checkout"};
 }
 
+Obstacle editBeforeMerge(const std::string &name)
+{
+    return {name, "the uncommitted changes of '" + name + "' would be lost in the merge"};
+}
+
+Obstacle unreadableFile(const std::string &name)
+{
+    return {name, "'" + name + "' cannot be read, and its changes would be lost in the checkout"};
+}
+
 int reportConflict(const Obstacle &obstacle)
 {
     git_error_set_str(GIT_ERROR_CHECKOUT, obstacle.text.c_str());

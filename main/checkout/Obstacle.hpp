@@ -29,6 +29,12 @@ Obstacle inChangedFolder(const std::string &name, Standing standing);
 /// What is staged would be overwritten.
 Obstacle stagedChangesOf(const std::string &name);
 
+/// An edit of a tracked file; a merge would overwrite or commit it.
+Obstacle editBeforeMerge(const std::string &name);
+
+/// An edit of a tracked file may exist, and be lost.
+Obstacle unreadableFile(const std::string &name);
+
 /// Makes the text libgit2's last error, and returns GIT_ECONFLICT, for a callback.
 int reportConflict(const Obstacle &obstacle);
 

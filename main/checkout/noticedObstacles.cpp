@@ -86,8 +86,7 @@ Finding findEdit(WorkingCopy & /*copy*/, const CheckoutNotice &notice)
     {
         return {};
     }
-    const std::string name = nameOf(*notice.workdir);
-    return Obstacle{name, "the uncommitted changes of '" + name + "' would be lost in the merge"};
+    return editBeforeMerge(nameOf(*notice.workdir));
 }
 
 Finding findUntrackedNoticed(WorkingCopy &copy, const CheckoutNotice &notice)

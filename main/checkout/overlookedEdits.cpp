@@ -34,6 +34,28 @@ bool hasInodeOf(const git_index_entry &entry, const struct stat &status)
            isSameTime(entry.ctime, status.st_ctim);
 }
 
+bool isOfKindOf(const git_index_entry &entry, const struct stat &status)
+{
+    return (entry.mode & S_IFMT) == (status.st_mode & S_IFMT);
+}
+
+/// Returns the obstacle if the file is edited, or may be because it cannot be read.
+Finding judgeChangedFile(WorkingCopy &copy, const std::string &name)
+{
+    const git_index_entry *const entry = copy.entryOf(name);
+    const struct stat &status = copy.statusOf(name);
+    // libgit2 compares the kind without reading the file.
+    if (entry == nullptr || !isOfKindOf(*entry, status))
+    {
+        return {};
+    }
+    if (S_ISREG(status.st_mode) && !copy.isReadable(name))
+    {
+        return unreadableFile(name);
+    }
+    return copy.isEdited(*entry) ? editBeforeMerge(name) : Finding();
+}
+
 } // namespace
 
 Finding findOverlookedEdit(WorkingCopy &copy, const TreeChange &change)
@@ -56,11 +78,9 @@ Finding findOverlookedEdit(WorkingCopy &copy, const TreeChange &change)
     }
     if (S_ISREG(status.st_mode) && !copy.isReadable(change.path))
     {
-        return Obstacle{change.path, "'" + change.path +
-                                         "' cannot be read, and its changes would be lost in the "
-                                         "checkout"};
+        return unreadableFile(change.path);
     }
-    const bool isOfSameKind = (entry->mode & S_IFMT) == (status.st_mode & S_IFMT);
+    const bool isOfSameKind = isOfKindOf(*entry, status);
     const bool isEditOfSameSize = isAsLibGit2Sees && isOfSameKind &&
                                   !copy.isConvertedByGit(change.path) && copy.isEdited(*entry);
     // libgit2 finds this, too, except if its own hash fails: it does for a file of more than 4 GiB,
@@ -73,6 +93,18 @@ Finding findOverlookedEdit(WorkingCopy &copy, const TreeChange &change)
     {
         return Obstacle{change.path, "the uncommitted changes of '" + change.path +
                                          "' would be lost in the checkout"};
+    }
+    return {};
+}
+
+Finding findEditBeforeMerge(WorkingCopy &copy, const ChangedFiles &changed)
+{
+    for (const ChangedFile &file : changed.files())
+    {
+        if (Finding found = judgeChangedFile(copy, file.path))
+        {
+            return found;
+        }
     }
     return {};
 }

@@ -4,9 +4,10 @@
 #include "main/checkout/Obstacle.hpp"
 #include "main/checkout/WorkingCopy.hpp"
 #include "main/checkout/treeChanges.hpp"
+#include "util/repository/ChangedFiles.hpp"
 
-/// The rules of a switch or a fast-forward for changes of the user that libgit2 would overwrite,
-/// because it takes the file for unchanged or ignored.
+/// The rules for changes of the user that libgit2 would overwrite, or a merge commit, because
+/// libgit2 takes the file for unchanged or ignored.
 namespace vclink::git
 {
 
@@ -18,6 +19,11 @@ namespace vclink::git
 /// file for changed. Also finds a folder in the place of a tracked file, if the name is ignored:
 /// libgit2 would delete the folder.
 Finding findOverlookedEdit(WorkingCopy &copy, const TreeChange &change);
+
+/// Returns the first tracked file with a change, before a merge. libgit2 sees most of these, after
+/// it has run the merge's commands. It overlooks a change for the reasons that findOverlookedEdit
+/// has, and the merge's commit would contain the change of a file that the merge does not touch.
+Finding findEditBeforeMerge(WorkingCopy &copy, const ChangedFiles &changed);
 
 /// Finds a file that is in the index although it is ignored, in the place of a new file or folder.
 Finding findStagedThoughIgnored(WorkingCopy &copy, const TreeChange &change);

@@ -206,19 +206,33 @@ TEST_P(CommitOverFailingCall, FailsOrHoldsEveryFileAndParent)
     }
 }
 
-/// A checkout in a working copy of which every file is edited.
+/// A checkout in a working copy with edited files.
 class CheckoutOverFailingCall : public FailingFileCall
 {
   protected:
     using Edit = std::string (*)(const std::string &);
 
-    /// Makes the edit in every file.
+    static std::string lengthen(const std::string &content)
+    {
+        return content + "mine\n";
+    }
+    static std::string keepSize(const std::string &content)
+    {
+        return std::string(content.size(), 'm');
+    }
+
+    std::vector<std::string> everyFile() const
+    {
+        return vclink::test::split(trial_.repository().git({"ls-files"}));
+    }
+
     /// @return what the files hold then
-    std::map<std::string, std::string> editAll(Edit edit) const
+    std::map<std::string, std::string> editEach(const std::vector<std::string> &names,
+                                                Edit edit) const
     {
         const GitRepository &repository = trial_.repository();
         std::map<std::string, std::string> edited;
-        for (const std::string &name : vclink::test::split(repository.git({"ls-files"})))
+        for (const std::string &name : names)
         {
             edited[name] = edit(repository.read(name));
             repository.write(name, edited[name]);
@@ -227,13 +241,13 @@ class CheckoutOverFailingCall : public FailingFileCall
     }
 
     /// Lets each call fail in turn, until there is none left.
-    void failEach(Edit edit)
+    void failEach(const std::vector<std::string> &names, Edit edit)
     {
         std::string function = "the first";
         for (int call = 1; !function.empty(); ++call)
         {
             const auto action = trial_.begin();
-            const std::map<std::string, std::string> edited = editAll(edit);
+            const std::map<std::string, std::string> edited = editEach(names, edit);
             std::string outcome;
             {
                 const FailingFiles failing(call, EMFILE);
@@ -243,16 +257,33 @@ class CheckoutOverFailingCall : public FailingFileCall
             SCOPED_TRACE("call " + std::to_string(call) + ", " + function + ": " + outcome);
             for (const auto &[name, content] : edited)
                 EXPECT_EQ(trial_.repository().read(name), content) << name;
+            EXPECT_THAT(differingFromHead(), testing::IsSupersetOf(names));
         }
+    }
+
+  private:
+    /// What is not committed.
+    std::vector<std::string> differingFromHead() const
+    {
+        return vclink::test::split(trial_.repository().git({"diff", "--name-only", "HEAD"}));
     }
 };
 
 /// libgit2 takes a file whose id it can't compute for an unchanged one.
 TEST_P(CheckoutOverFailingCall, KeepsEveryEdit)
 {
-    failEach([](const std::string &content) { return content + "mine\n"; });
-    // Of the same size.
-    failEach([](const std::string &content) { return std::string(content.size(), 'm'); });
+    trial_.begin();
+    failEach(everyFile(), lengthen);
+    failEach(everyFile(), keepSize);
+}
+
+/// A merge that makes a commit. libgit2 refuses any edit of a file that the merge touches.
+using MergeOverFailingCall = CheckoutOverFailingCall;
+
+TEST_P(MergeOverFailingCall, CommitsNoEditOfAFileThatItDoesNotTouch)
+{
+    failEach({"sub/inside"}, lengthen);
+    failEach({"sub/inside"}, keepSize);
 }
 
 /// libgit2 takes an index that it can't look at for an empty one.
@@ -319,6 +350,10 @@ INSTANTIATE_TEST_SUITE_P(Of, CommitOverFailingCall,
 
 INSTANTIATE_TEST_SUITE_P(Of, CheckoutOverFailingCall,
                          testing::ValuesIn(operationsOf({"switchBranch", "mergeFastForward"})),
+                         vclink::test::nameOfTest);
+
+INSTANTIATE_TEST_SUITE_P(Of, MergeOverFailingCall,
+                         testing::ValuesIn(operationsOf({"mergeThreeWay"})),
                          vclink::test::nameOfTest);
 
 INSTANTIATE_TEST_SUITE_P(Of, FailingFileCall, testing::ValuesIn(writingOperations()),

@@ -240,7 +240,7 @@ std::vector<Tolerance> tolerancesOfOthers(const std::string &operation, const st
         // A submodule need not be in .gitmodules.
         {"", "git_submodule_lookup", any, GIT_ENOTFOUND, normal},
         // A name that HEAD does not have, and histories without a common commit.
-        {"mergeFileAndFolder", "git_tree_entry_bypath", 1, GIT_ENOTFOUND,
+        {"mergeFileAndFolder", "git_tree_entry_bypath", 3, GIT_ENOTFOUND,
          failureIn(operation, GIT_ECONFLICT, GIT_ERROR_CHECKOUT,
                    "the folder 'new' is in the way of the checkout")},
         {"switchBranchOverFolder", "git_tree_entry_bypath", 2, GIT_ENOTFOUND,

@@ -117,6 +117,7 @@ class Look
             const bool hasBoth =
                 last != nullptr && isNormal(*last) && std::strcmp(last->path, entry.path) == 0;
             dependOnOrder_ = dependOnOrder_ || hasBoth || isForAttributes(entry.path);
+            hasConflicts_ = true;
             return std::nullopt;
         }
         return isCompared(entry) && entry.mode != GIT_FILEMODE_COMMIT ? compare(entry)
@@ -126,6 +127,10 @@ class Look
     bool dependOnOrder() const noexcept
     {
         return dependOnOrder_;
+    }
+    bool hasConflicts() const noexcept
+    {
+        return hasConflicts_;
     }
 
   private:
@@ -167,6 +172,7 @@ class Look
     std::int32_t indexTime_;
     const git_index_entry *last_ = nullptr;
     bool dependOnOrder_ = false;
+    bool hasConflicts_ = false;
 };
 
 } // namespace
@@ -188,6 +194,7 @@ ChangedFiles::ChangedFiles(git_repository *repository, git_index *index)
         }
     }
     dependOnOrder_ = look.dependOnOrder();
+    hasConflicts_ = look.hasConflicts();
 }
 
 bool isForAttributes(const std::string &path) noexcept

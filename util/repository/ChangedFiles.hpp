@@ -45,9 +45,16 @@ class ChangedFiles
         return dependOnOrder_;
     }
 
+    /// Whether a file is in conflict.
+    bool hasConflicts() const noexcept
+    {
+        return hasConflicts_;
+    }
+
   private:
     std::vector<ChangedFile> files_;
     bool dependOnOrder_ = false;
+    bool hasConflicts_ = false;
 };
 
 /// Whether a file with this path contains attributes.

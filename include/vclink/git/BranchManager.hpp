@@ -120,8 +120,8 @@ class VCLINK_GIT_EXPORT BranchManager
     /// - if a symbolic link, FIFO, socket or device is in the way.
     ///
     /// The merge drivers may have run by then. docs/limitations.md has more cases. The added text
-    /// names the first such file. If the merge changes that file too, the text has only the number
-    /// of such files.
+    /// names the first such file. If all changes are staged, the text has only the number of such
+    /// files.
     ///
     /// Restores missing files and overwrites ignored ones. Keeps the folders of submodules; the
     /// merge commit records the submodules' commits as merged, whatever is checked out in them.

@@ -1,5 +1,8 @@
 // SPDX-License-Identifier: MIT
+#include <ctime>
 #include <string>
+#include <utility>
+#include <vector>
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
@@ -49,6 +52,72 @@ TEST_F(MergeEdits, AreRefusedWithTheFirstName)
     repository_.git({"update-index", "--skip-worktree", "other"});
     repository_.write("other", "mine\n");
     expectMergeRefused(inTheWay("untracked file 'd/new'"));
+}
+
+/// libgit2 does not see these, and the commit would have those of files that the merge leaves
+/// alone.
+TEST_F(MergeEdits, OfTheSameSizeAndTimeAreRefused)
+{
+    theyWrite({"d/g"});
+    // libgit2 never sees these if the file is dated before 1970.
+    repository_.git({"config", "core.trustctime", "false"});
+    for (const auto &[name, time] :
+         std::vector<std::pair<std::string, std::time_t>>{{"d/f", 1'000'000'000}, {"d/g", -1000}})
+    {
+        SCOPED_TRACE(name);
+        const std::string content = repository_.read(name);
+        setsAnOldTime(name, time)(repository_);
+        repository_.git({"update-index", "--refresh"});
+        writesAtTheSameTime(name, "M\n")(repository_);
+        expectMergeRefused(edited(name));
+        EXPECT_EQ(repository_.read(name), "M\n");
+        repository_.write(name, content);
+    }
+    expectCleanAsGit();
+}
+
+/// As after a copy of a working copy with its times.
+TEST_F(MergeEdits, AreNotOtherInodesWithTheSameContent)
+{
+    theyWrite({"d/g"});
+    for (const std::string name : {"d/f", "d/g", "other"})
+    {
+        setsAnOldTime(name)(repository_);
+        repository_.git({"update-index", "--refresh"});
+        const std::string content = repository_.read(name);
+        repository_.remove(name);
+        repository_.write(name, content);
+        setsAnOldTime(name)(repository_);
+    }
+    expectCleanAsGit();
+}
+
+/// The commit would have what the file holds in place of what git stores.
+TEST_F(MergeEdits, MayBeInOtherInodesOfFilteredFilesUntilGitHasLookedAtThem)
+{
+    repository_.git({"config", "filter.large.clean", "tr a-z A-Z"});
+    repository_.git({"config", "filter.large.smudge", "tr A-Z a-z"});
+    repository_.commitAll(writes(".gitattributes", "/d/f filter=large\n"), "attributes");
+    repository_.commitAll(writes("d/f", "large\n"), "filtered");
+    theyWrite({"theirs"});
+    setsAnOldTime("d/f")(repository_);
+    repository_.git({"update-index", "--refresh"});
+    repository_.remove("d/f");
+    repository_.write("d/f", "large\n");
+    setsAnOldTime("d/f")(repository_);
+    expectMergeRefused(edited("d/f"));
+    EXPECT_THAT(status(), IsEmpty());
+    expectCleanAsGit();
+}
+
+TEST_F(MergeEdits, MayBeInFilesThatCannotBeRead)
+{
+    theyWrite({"theirs"});
+    repository_.write("other", "mine\n");
+    EXPECT_EQ(
+        runUnprivileged("other", 0200, [this] { return failureOfMerge("topic"); }),
+        textOf(refusal("'other' cannot be read, and its changes would be lost in the checkout")));
+    EXPECT_EQ(repository_.read("other"), "mine\n");
 }
 
 /// libgit2 would forget the conflict, and delete a file that HEAD does not have.

@@ -219,8 +219,8 @@ TEST_F(MergeObstacles, AreNotIgnoredLinksWhichAreReplacedAsGitDoes)
     ignore("ignored*");
     repository_.symlink("../../outside/new", "d/ignored");
     repository_.symlink("../outside", "ignored-folder");
-    // They come back if the merge is refused.
-    repository_.write("other", "mine\n");
+    // They come back if libgit2's notification of the edit refuses the merge.
+    makesExecutable("other")(repository_);
     expectMergeRefused(refusal("the uncommitted changes of 'other' would be lost in the merge"));
     repository_.git({"restore", "other"});
     expectCleanAsGit();

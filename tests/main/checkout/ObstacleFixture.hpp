@@ -1,12 +1,16 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include <array>
+#include <cstddef>
+#include <ctime>
 #include <filesystem>
 #include <functional>
 #include <stdexcept>
 #include <string>
 #include <vector>
 
+#include <fcntl.h>
 #include <git2.h>
 #include <gtest/gtest.h>
 #include <sys/socket.h>
@@ -61,6 +65,29 @@ inline Change makesDevice(const std::string &name)
 inline Change makesSocket(const std::string &name)
 {
     return [=](const GitRepository &copy) { makeSocket(copy / name); };
+}
+
+/// As a program does that restores times: the content differs, size and time do not.
+inline Change writesAtTheSameTime(const std::string &name, const std::string &bytes)
+{
+    return [=](const GitRepository &copy)
+    {
+        struct stat before = {};
+        ASSERT_EQ(::stat((copy / name).c_str(), &before), 0);
+        ASSERT_EQ(static_cast<std::size_t>(before.st_size), bytes.size());
+        copy.write(name, bytes);
+        const std::array<timespec, 2> times{before.st_atim, before.st_mtim};
+        ASSERT_EQ(::utimensat(AT_FDCWD, (copy / name).c_str(), times.data(), 0), 0);
+    };
+}
+
+inline Change setsAnOldTime(const std::string &name, std::time_t time = 1'000'000'000)
+{
+    return [=](const GitRepository &copy)
+    {
+        const std::array<timespec, 2> times{timespec{time, 0}, timespec{time, 0}};
+        ASSERT_EQ(::utimensat(AT_FDCWD, (copy / name).c_str(), times.data(), 0), 0);
+    };
 }
 
 /// Patterns of ignored files, in place of any others.

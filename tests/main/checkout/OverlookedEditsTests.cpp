@@ -1,16 +1,12 @@
 // SPDX-License-Identifier: MIT
 #include "main/checkout/overlookedEdits.hpp"
 
-#include <array>
-#include <cstddef>
 #include <filesystem>
 #include <string>
 #include <vector>
 
-#include <fcntl.h>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
-#include <sys/stat.h>
 
 #include "ObstacleFixture.hpp"
 
@@ -41,29 +37,6 @@ class OverlookedEdits : public ObstacleFixture
                   textOf(failure));
     }
 };
-
-/// As a program does that restores times: the content differs, size and time do not.
-Change writesAtTheSameTime(const std::string &name, const std::string &bytes)
-{
-    return [=](const GitRepository &copy)
-    {
-        struct stat before = {};
-        ASSERT_EQ(::stat((copy / name).c_str(), &before), 0);
-        ASSERT_EQ(static_cast<std::size_t>(before.st_size), bytes.size());
-        copy.write(name, bytes);
-        const std::array<timespec, 2> times{before.st_atim, before.st_mtim};
-        ASSERT_EQ(::utimensat(AT_FDCWD, (copy / name).c_str(), times.data(), 0), 0);
-    };
-}
-
-Change setsAnOldTime(const std::string &name)
-{
-    return [=](const GitRepository &copy)
-    {
-        const std::array<timespec, 2> times{timespec{1'000'000'000, 0}, timespec{1'000'000'000, 0}};
-        ASSERT_EQ(::utimensat(AT_FDCWD, (copy / name).c_str(), times.data(), 0), 0);
-    };
-}
 
 Failure lost(const std::string &name)
 {

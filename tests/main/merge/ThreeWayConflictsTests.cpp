@@ -274,7 +274,11 @@ TEST_P(RefusedThreeWayMerge, AsInGitKeeps)
 const Failure overwritten{GIT_ECONFLICT, GIT_ERROR_MERGE,
                           "1 uncommitted change would be overwritten by merge"};
 const WorkInTheWay worksInTheWay[]{
-    {{"AnEditOfAFileThatItTouches"}, writes("file", "mine\n"), overwritten, true},
+    {{"AnEditOfAFileThatItTouches"},
+     writes("file", "mine\n"),
+     {GIT_ECONFLICT, GIT_ERROR_CHECKOUT,
+      "the uncommitted changes of 'file' would be lost in the merge"},
+     false},
     {{"AStagedEditOfAFileThatItTouches"},
      writes("file", "mine\n") + runsGit({"add", "file"}),
      overwritten,
