@@ -71,8 +71,7 @@ void Workplace::expectNothingLost(const std::set<std::string> &commits,
 {
     for (const char *name : {"repository", "origin"})
     {
-        const auto checked = GitRepository(folder_ / name)
-                                 .tryGit({"fsck", "--strict", "--no-dangling", "--no-progress"});
+        const auto checked = GitRepository(folder_ / name).check();
         EXPECT_TRUE(checked.succeeded()) << name << ": " << checked.output << checked.errors;
     }
     expectReached(repository_, commits);

@@ -166,8 +166,7 @@ void Trial::expectSound() const
         repositories.push_back(folder_ / "subject/origin");
     for (const auto &path : repositories)
     {
-        const auto checked =
-            GitRepository(path).tryGit({"fsck", "--strict", "--no-dangling", "--no-progress"});
+        const auto checked = GitRepository(path).check();
         EXPECT_TRUE(checked.succeeded()) << checked.output << checked.errors;
     }
     for (const auto &entry : fs::recursive_directory_iterator(folder_ / "subject"))

@@ -248,6 +248,14 @@ CommandResult GitRepository::tryGit(const std::vector<std::string> &arguments) c
     return command(arguments).run();
 }
 
+CommandResult GitRepository::check() const
+{
+    // For each of these two kinds of files, which the library never writes, git would start a
+    // process, even if there is none.
+    return tryGit({"-c", "core.commitGraph=false", "-c", "core.multiPackIndex=false", "fsck",
+                   "--strict", "--no-dangling", "--no-progress"});
+}
+
 Command GitRepository::command(const std::vector<std::string> &arguments) const
 {
     return makeCommand(arguments).in(path_);

@@ -78,6 +78,9 @@ class GitRepository
     /// Runs git in the working copy; failure is in the result.
     CommandResult tryGit(const std::vector<std::string> &arguments) const;
 
+    /// Has git check all objects, references and the index; what nothing refers to is in order.
+    CommandResult check() const;
+
     /// The command that git() runs, to be changed before it is run.
     Command command(const std::vector<std::string> &arguments) const;
 

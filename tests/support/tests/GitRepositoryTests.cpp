@@ -120,6 +120,27 @@ TEST_F(GitRepositoryTest, TellsTheIdOfACommitOnABranchOnNoneAndInALinkedWorkingC
     expectIdOfHead(GitRepository(folder() / "linked"));
 }
 
+TEST_F(GitRepositoryTest, ChecksObjectsReferencesAndTheIndex)
+{
+    auto repository = makeRepository();
+    repository.write("file", "text");
+    const auto id = repository.commitAll("first");
+    EXPECT_TRUE(repository.check().succeeded());
+    const auto expectFault = [&](const std::string &name)
+    {
+        const std::string bytes = repository.read(name);
+        repository.remove(name);
+        repository.write(name, bytes.substr(0, bytes.size() - 1) + '?');
+        EXPECT_FALSE(repository.check().succeeded()) << name;
+        repository.remove(name);
+        repository.write(name, bytes);
+    };
+    expectFault(".git/objects/" + id.substr(0, 2) + '/' + id.substr(2));
+    expectFault(".git/refs/heads/main");
+    expectFault(".git/index");
+    EXPECT_TRUE(repository.check().succeeded());
+}
+
 TEST_F(GitRepositoryTest, RaisesWithTheWordsOfGit)
 {
     const auto repository = makeRepository();
