@@ -145,6 +145,8 @@ std::filesystem::path GitRepository::gitFolder() const
     const auto folder = path_ / ".git";
     if (std::filesystem::is_directory(folder))
         return folder;
+    if (!std::filesystem::exists(folder) && std::filesystem::exists(path_ / "objects"))
+        return path_;
     const std::string text = withoutLineFeed(readOrThrow(folder));
     if (text.compare(0, beginning.size(), beginning) != 0)
         throw std::runtime_error("no git folder in " + path_.string());

@@ -33,7 +33,8 @@ class GitRepository
     {
         return path_ / name;
     }
-    /// The folder ".git", or the one that a file ".git" names: it has the index and HEAD.
+    /// The folder ".git", or the one that a file ".git" names: it has the index and HEAD. A bare
+    /// repository is one itself.
     std::filesystem::path gitFolder() const;
     /// The folder with what all working trees of a repository share, e.g. its configuration.
     std::filesystem::path sharedGitFolder() const;

@@ -35,9 +35,22 @@ std::string shortened(const std::string &bytes)
            std::to_string(std::hash<std::string>()(bytes));
 }
 
-fs::path gitFolder(const GitRepository &repository)
+/// The reference that HEAD names, if any, and the id of its commit, if it has one.
+std::string headIn(const fs::path &gitFolder, const std::string &references)
 {
-    return repository.line({"rev-parse", "--absolute-git-dir"});
+    const std::string beginning = "ref: ";
+    const fs::path file = gitFolder / "HEAD";
+    const std::string head =
+        fs::is_symlink(file) ? beginning + fs::read_symlink(file).string() + '\n' : readFile(file);
+    if (!startsWith(head, beginning))
+        return head;
+    const std::string name = head.substr(beginning.size(), head.size() - beginning.size() - 1);
+    for (const auto &reference : split(references))
+    {
+        if (startsWith(reference, name + ' '))
+            return name + '\n' + reference.substr(name.size() + 1) + '\n';
+    }
+    return name + '\n';
 }
 
 std::string contentOf(const fs::directory_entry &entry)
@@ -82,11 +95,10 @@ auto members(const FileStamp &stamp)
 
 RepositoryState stateOf(const GitRepository &repository)
 {
-    const fs::path folder = gitFolder(repository);
+    const fs::path folder = repository.gitFolder();
     RepositoryState state;
-    state.head = repository.tryGit({"symbolic-ref", "--quiet", "HEAD"}).output +
-                 repository.tryGit({"rev-parse", "--quiet", "--verify", "HEAD"}).output;
     state.references = repository.git({"for-each-ref", "--format=%(refname) %(objectname)"});
+    state.head = headIn(folder, state.references);
     state.reflog = readFile(folder / "logs/HEAD");
     for (const auto *name : filesUnderWay)
     {
@@ -165,7 +177,7 @@ FileStamp stampOf(const fs::path &file)
 
 FileStamp indexStampOf(const GitRepository &repository)
 {
-    return stampOf(gitFolder(repository) / "index");
+    return stampOf(repository.gitFolder() / "index");
 }
 
 bool operator==(const FileStamp &left, const FileStamp &right)

@@ -120,6 +120,24 @@ TEST_F(GitRepositoryTest, TellsTheIdOfACommitOnABranchOnNoneAndInALinkedWorkingC
     expectIdOfHead(GitRepository(folder() / "linked"));
 }
 
+TEST_F(GitRepositoryTest, KnowsTheGitFolderOfEachKind)
+{
+    const auto expectGitFolder = [](const GitRepository &repository)
+    {
+        EXPECT_EQ(repository.gitFolder(), repository.line({"rev-parse", "--absolute-git-dir"}));
+        EXPECT_EQ(fs::canonical(repository.path() / repository.sharedGitFolder()),
+                  repository.line({"rev-parse", "--path-format=absolute", "--git-common-dir"}));
+    };
+    auto repository = makeRepository();
+    repository.commit("first");
+    repository.git({"worktree", "add", "--quiet", folder() / "linked"});
+    repository.git({"clone", "--quiet", "--bare", ".", folder() / "bare"});
+    repository.git({"submodule", "--quiet", "add", folder() / "bare", "module"});
+    expectGitFolder(repository);
+    for (const auto *name : {"linked", "bare", "repository/module"})
+        expectGitFolder(GitRepository(folder() / name));
+}
+
 TEST_F(GitRepositoryTest, ChecksObjectsReferencesAndTheIndex)
 {
     auto repository = makeRepository();
