@@ -36,8 +36,7 @@ bool waitFor(const std::function<bool()> &holds)
 
 DesktopFixture::DesktopFixture()
 {
-    repository_.git({"config", "user.name", "Ada"});
-    repository_.git({"config", "user.email", "ada@example.org"});
+    repository_.identify("Ada", "ada@example.org");
     desktop::setLanguage(QStringLiteral("en"));
 }
 

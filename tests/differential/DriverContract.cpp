@@ -197,8 +197,7 @@ GitRepository makeRepositoryOf(const DriverCase &driverCase, const fs::path &fol
                                const HermeticEnvironment &environment)
 {
     auto repository = GitRepository::init(folder / "git");
-    repository.git({"config", "user.name", "Test Author"});
-    repository.git({"config", "user.email", "author@example.com"});
+    repository.identify("Test Author", "author@example.com");
     repository.write(".gitattributes", driverCase.attributes);
     driverCase.base(repository);
     repository.commitAll("base");

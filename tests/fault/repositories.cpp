@@ -12,8 +12,7 @@ namespace
 
 void configureIdentity(const GitRepository &repository)
 {
-    repository.git({"config", "user.name", "Test Person"});
-    repository.git({"config", "user.email", "person@example.com"});
+    repository.identify("Test Person", "person@example.com");
 }
 
 void diverge(GitRepository &repository, const Change &ours, const Change &theirs)

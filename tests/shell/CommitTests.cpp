@@ -26,8 +26,7 @@ class ShellCommit : public ChangeFixture
   protected:
     void setIdentity() const
     {
-        repository_.git({"config", "user.name", "A. U. Thor"});
-        repository_.git({"config", "user.email", "author@example.org"});
+        repository_.identify("A. U. Thor", "author@example.org");
     }
     /// The commit at HEAD below its first lines, byte by byte.
     std::string message() const

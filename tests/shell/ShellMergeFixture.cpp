@@ -6,8 +6,7 @@ namespace vclink::test
 
 ShellMergeFixture::ShellMergeFixture()
 {
-    repository_.git({"config", "user.name", "A"});
-    repository_.git({"config", "user.email", "a@example.org"});
+    repository_.identify("A", "a@example.org");
 }
 
 void ShellMergeFixture::commitFiles(const Files &files)

@@ -105,8 +105,7 @@ class ShellSignals : public ShellFixture
         for (int number = 0; number < fileCount; ++number)
             template_.write(nameOf(number), std::to_string(number) + '\n');
         template_.commitAll("many");
-        template_.git({"config", "user.name", "A"});
-        template_.git({"config", "user.email", "a@example.org"});
+        template_.identify("A", "a@example.org");
     }
 
     static std::string nameOf(int number)

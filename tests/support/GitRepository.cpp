@@ -189,6 +189,14 @@ void GitRepository::setMode(const std::string &name, unsigned mode) const
     std::filesystem::permissions(path_ / name, std::filesystem::perms(mode));
 }
 
+void GitRepository::identify(const std::string &name, const std::string &email) const
+{
+    std::ofstream configuration(sharedGitFolder() / "config", std::ios::app);
+    configuration << "[user]\n\tname = " << name << "\n\temail = " << email << '\n' << std::flush;
+    if (!configuration)
+        throw std::runtime_error("can't write the configuration in " + path_.string());
+}
+
 void GitRepository::add(const std::vector<std::string> &names) const
 {
     if (names.empty())

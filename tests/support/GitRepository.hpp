@@ -54,6 +54,9 @@ class GitRepository
     /// Sets the permissions, e.g. 0755.
     void setMode(const std::string &name, unsigned mode) const;
 
+    /// Adds an identity to the repository's configuration, which has none.
+    void identify(const std::string &name, const std::string &email) const;
+
     /// Stages these names exactly, as they stand; without names the whole tree.
     void add(const std::vector<std::string> &names = {}) const;
     /// Commits the index, also an unchanged one, under an identity that is not written to any

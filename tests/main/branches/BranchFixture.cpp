@@ -22,8 +22,7 @@ std::string textOf(const Failure &failure)
 
 BranchFixture::BranchFixture()
 {
-    repository_.git({"config", "user.name", "Test Person"});
-    repository_.git({"config", "user.email", "person@example.com"});
+    repository_.identify("Test Person", "person@example.com");
 }
 
 std::string BranchFixture::idOf(const std::string &revision) const

@@ -14,8 +14,7 @@ CommitFixture::CommitFixture()
 
 void CommitFixture::configureIdentity(const GitRepository &repository)
 {
-    repository.git({"config", "user.name", "Test Person"});
-    repository.git({"config", "user.email", "person@example.com"});
+    repository.identify("Test Person", "person@example.com");
 }
 
 void CommitFixture::commit(const std::string &message) const

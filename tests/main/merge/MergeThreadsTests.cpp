@@ -67,8 +67,7 @@ class MergeThreads : public GitFixture
         const std::string joining = scripts_.shell("cat \"$1\" \"$3\" >>\"$2\"") + " %O %A %B";
         for (auto &repository : repositories_)
         {
-            repository.git({"config", "user.name", "Test Person"});
-            repository.git({"config", "user.email", "person@example.com"});
+            repository.identify("Test Person", "person@example.com");
             repository.git({"config", "merge.tool.driver", joining});
             repository.write(".gitattributes", "file merge=tool\n");
             repository.write("file", "base\n");

@@ -138,6 +138,16 @@ TEST_F(GitRepositoryTest, KnowsTheGitFolderOfEachKind)
         expectGitFolder(GitRepository(folder() / name));
 }
 
+TEST_F(GitRepositoryTest, IdentifiesAsGitConfigDoes)
+{
+    const auto repository = makeRepository("one");
+    repository.identify("J. Random", "j@example.com");
+    const auto twin = makeRepository("two");
+    twin.git({"config", "user.name", "J. Random"});
+    twin.git({"config", "user.email", "j@example.com"});
+    EXPECT_EQ(repository.read(".git/config"), twin.read(".git/config"));
+}
+
 TEST_F(GitRepositoryTest, ChecksObjectsReferencesAndTheIndex)
 {
     auto repository = makeRepository();
