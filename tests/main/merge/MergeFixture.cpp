@@ -9,6 +9,7 @@
 #include <boost/variant/get.hpp>
 #include <gtest/gtest.h>
 
+#include "support/readFile.hpp"
 #include "support/text.hpp"
 #include "vclink/git/GitException.hpp"
 #include "vclink/git/messageIdentifiers.hpp"
@@ -58,10 +59,11 @@ void print(std::ostream &stream, const RepositoryState::Entries &entries)
 MergeOutcome outcomeIn(const GitRepository &repository)
 {
     MergeOutcome outcome;
-    outcome.parents = repository.tryGit({"log", "-1", "--format=%P"}).output;
-    outcome.tree = repository.tryGit({"rev-parse", "--quiet", "HEAD^{tree}"}).output;
-    outcome.mergeHead =
-        repository.tryGit({"rev-parse", "--quiet", "--verify", "MERGE_HEAD"}).output;
+    const std::string commit = repository.tryGit({"log", "-1", "--format=%T %P"}).output;
+    const auto blank = std::min(commit.find(' '), commit.size());
+    outcome.tree = commit.substr(0, blank);
+    outcome.parents = commit.substr(blank);
+    outcome.mergeHead = readFile(repository.gitFolder() / "MERGE_HEAD");
     outcome.index = indexOf(repository);
     outcome.workingTree = withoutLabels(workingTreeOf(repository));
     return outcome;
@@ -74,7 +76,7 @@ bool operator==(const MergeOutcome &left, const MergeOutcome &right)
 
 std::ostream &operator<<(std::ostream &stream, const MergeOutcome &outcome)
 {
-    stream << "parents " << outcome.parents << "tree " << outcome.tree << "merge head "
+    stream << "tree " << outcome.tree << ", parents" << outcome.parents << "merge head "
            << outcome.mergeHead << "\nindex:\n";
     print(stream, outcome.index);
     stream << "working tree:\n";
