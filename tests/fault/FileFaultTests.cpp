@@ -170,12 +170,10 @@ TEST_P(FailingFileCall, LeavesTheRepositoryInOrder)
 class CommitOverFailingCall : public FailingFileCall
 {
   protected:
-    /// The files of the commit at HEAD, and its parents.
+    /// The tree and the parents of the commit at HEAD.
     std::string committed() const
     {
-        const GitRepository &repository = trial_.repository();
-        return repository.git({"ls-tree", "-r", "HEAD"}) +
-               repository.git({"log", "-1", "--format=%P"});
+        return trial_.repository().git({"log", "-1", "--format=%T %P"});
     }
 };
 
@@ -185,10 +183,11 @@ TEST_P(CommitOverFailingCall, FailsOrHoldsEveryFileAndParent)
     trial_.begin()();
     const std::string expected = committed();
     const int count = countCalls();
+    trial_.begin();
+    const std::string before = committed();
     for (int call = 1; call <= count; ++call)
     {
         const auto action = trial_.begin();
-        const std::string before = committed();
         std::string function;
         std::string outcome;
         {

@@ -13,6 +13,7 @@
 #include <unistd.h>
 
 #include "support/Descriptors.hpp"
+#include "support/readFile.hpp"
 #include "support/strings.hpp"
 #include "support/text.hpp"
 
@@ -70,6 +71,19 @@ bool isReference(const fs::path &file)
             file.filename() == "HEAD");
 }
 
+/// The reference that HEAD names; nothing if it has a commit's id.
+std::string branchAtHead(const GitRepository &repository)
+{
+    const std::string head = readFile(repository.gitFolder() / "HEAD");
+    return startsWith(head, "ref: ") ? head : std::string();
+}
+
+/// The id of the commit that a merge under way merges, if there is one.
+std::string otherSide(const GitRepository &repository)
+{
+    return readFile(repository.gitFolder() / "MERGE_HEAD");
+}
+
 RepositoryState::Entries referencesIn(const RepositoryState::Entries &files)
 {
     RepositoryState::Entries references;
@@ -114,12 +128,11 @@ std::string Trial::gist() const
 {
     const auto line = [this](const std::vector<std::string> &arguments)
     { return repository_.tryGit(arguments).output; };
+    // The graph shows which commits are merges.
     return line({"status", "--porcelain=v2", "--untracked-files=all"}) +
-           line({"ls-files", "--stage"}) + line({"symbolic-ref", "HEAD"}) +
-           line({"for-each-ref", "--format=%(refname) %(tree)"}) +
-           line({"log", "--all", "--format=%s, %an, %T"}) +
-           line({"log", "--all", "--merges", "--format=%s"}) + line({"rev-parse", "MERGE_HEAD"}) +
-           GitRepository(home_).read(".gitconfig");
+           line({"ls-files", "--stage"}) + line({"for-each-ref", "--format=%(refname) %(tree)"}) +
+           line({"log", "--all", "--graph", "--format=%s, %an, %T"}) + branchAtHead(repository_) +
+           otherSide(repository_) + GitRepository(home_).read(".gitconfig");
 }
 
 RepositoryState::Entries Trial::files() const
@@ -154,8 +167,7 @@ void Trial::expectWrittenByThese(const std::vector<std::string> &calls) const
     const auto merge = std::find(calls.begin(), calls.end(), "git_merge");
     if (std::find(merge, calls.end(), "git_oid_fmt") != calls.end())
     {
-        EXPECT_EQ(repository_.line({"rev-parse", "MERGE_HEAD"}),
-                  repository_.line({"rev-parse", "topic"}));
+        EXPECT_EQ(otherSide(repository_), repository_.git({"rev-parse", "topic"}));
     }
 }
 
@@ -201,11 +213,14 @@ void Trial::closeWhatLibGit2Leaves() const
 void Trial::removeWhatLibGit2Leaves() const
 {
     std::vector<fs::path> left;
-    for (const auto &entry : fs::recursive_directory_iterator(folder_ / "subject"))
+    for (const auto &folder : {repository_.path(), repository_.gitFolder()})
     {
-        // A fetch works over this one.
-        if (isLeftByLibGit2(entry.path()) && entry.path().filename() != "FETCH_HEAD.lock")
-            left.push_back(entry.path());
+        for (const auto &entry : fs::directory_iterator(folder))
+        {
+            // A fetch works over this one.
+            if (isLeftByLibGit2(entry.path()) && entry.path().filename() != "FETCH_HEAD.lock")
+                left.push_back(entry.path());
+        }
     }
     for (const auto &file : left)
         fs::remove(file);
