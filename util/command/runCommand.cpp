@@ -3,6 +3,7 @@
 
 #include <array>
 #include <cerrno>
+#include <csignal>
 #include <sstream>
 #include <system_error>
 
@@ -16,12 +17,14 @@
 #include <boost/process/v1/child.hpp>
 #include <boost/process/v1/env.hpp>
 #include <boost/process/v1/exception.hpp>
+#include <boost/process/v1/extend.hpp>
 #include <boost/process/v1/io.hpp>
 #include <boost/process/v1/pipe.hpp>
 #else
 #include <boost/process/child.hpp>
 #include <boost/process/env.hpp>
 #include <boost/process/exception.hpp>
+#include <boost/process/extend.hpp>
 #include <boost/process/io.hpp>
 #include <boost/process/pipe.hpp>
 #endif
@@ -66,6 +69,20 @@ int moveOffStandardStreams(int descriptor)
     raiseIfError(moved < 0 ? error : std::error_code(), "fcntl(2) failed");
     return moved;
 }
+
+/// Lets the command receive all signals. Many hosts block signals on their worker threads. A
+/// command that inherits this could not be ended, and a shell that waits for its children never
+/// would be.
+struct UnblockedSignals : process::extend::handler
+{
+    /// Runs in the child.
+    template <class Executor> void on_exec_setup(Executor & /*executor*/) const noexcept
+    {
+        sigset_t none;
+        ::sigemptyset(&none);
+        ::pthread_sigmask(SIG_SETMASK, &none, nullptr);
+    }
+};
 
 /// Makes a pipe that no other command inherits: a command that another thread starts at the same
 /// time would keep this output open.
@@ -141,7 +158,7 @@ int runCommand(const std::string &commandTemplate,
     const std::string usable = makeUsable(command);
     FailedStartCleanup cleanup(output.pipe().native_source(), output.pipe().native_sink());
     process::child child(usable, process::std_out > output, process::std_err > process::null,
-                         boost::this_process::environment());
+                         boost::this_process::environment(), UnblockedSignals());
     // If the process cannot be forked, Boost.Process throws nothing and returns no child. The
     // number of no child would mean every child of the process.
     raiseIfError(child.valid() ? std::error_code() : lastError(), "fork(2) failed");

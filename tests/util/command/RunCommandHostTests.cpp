@@ -133,6 +133,24 @@ TEST_F(RunCommandHost, ThatIsInterruptedBySignalsIsNotDisturbed)
     EXPECT_GE(signals, 1);
 }
 
+/// A shell would wait for its children for ever.
+TEST_F(RunCommandHost, ThatBlocksSignalsDoesNotBlockThoseOfTheCommand)
+{
+    const std::string program = scripts_.shell("grep -q '^SigBlk:[[:blank:]]*0*$' /proc/$$/status");
+    EXPECT_EQ(resultOf(program), 0);
+    sigset_t all;
+    sigset_t before;
+    ::sigfillset(&all);
+    ASSERT_EQ(::pthread_sigmask(SIG_SETMASK, &all, &before), 0);
+    sigset_t during;
+    ::pthread_sigmask(SIG_SETMASK, nullptr, &during);
+    EXPECT_EQ(resultOf(program), 0);
+    sigset_t after;
+    ::pthread_sigmask(SIG_SETMASK, &before, &after);
+    for (const int signal : {SIGCHLD, SIGINT, SIGTERM, SIGUSR1})
+        EXPECT_EQ(::sigismember(&after, signal), ::sigismember(&during, signal)) << signal;
+}
+
 TEST_F(RunCommandHost, MayHandleBrokenPipesAndHaveManyDescriptorsOrNoWorkingFolder)
 {
     const std::string program = scripts_.shell("echo x; exit 4");
