@@ -121,6 +121,7 @@ void GitAdapter::commit(const upath & /*folder*/, const ustring &message)
     else
     {
         refuseCommitWithAutostash(repository.get());
+        refuseCommitWithPatches(repository.get(), state);
         if (state == GIT_REPOSITORY_STATE_NONE)
         {
             removeMergeMarker(repository.get());

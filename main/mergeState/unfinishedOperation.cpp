@@ -2,6 +2,7 @@
 #include "main/mergeState/unfinishedOperation.hpp"
 
 #include <cerrno>
+#include <cstdlib>
 #include <string>
 
 #include <git2/errors.h>
@@ -9,8 +10,10 @@
 #include <unistd.h>
 
 #include "error/errorUtil/raiseGitError.hpp"
+#include "error/errorUtil/raiseSystemError.hpp"
 #include "util/repository/repository.hpp"
 #include "util/repository/workingTrees.hpp"
+#include "util/scope/wholeFile.hpp"
 
 namespace vclink::git
 {
@@ -61,6 +64,18 @@ bool hasAutostash(git_repository *repository)
     return false;
 }
 
+/// Returns the number in a file of `git am`, or 0 if it has none.
+unsigned long readNumber(const std::string &path)
+{
+    std::string text;
+    const int error = readWholeFile(path, text);
+    if (error != 0 && error != ENOENT)
+    {
+        raiseSystemError(error, "could not read '" + path + "'");
+    }
+    return std::strtoul(text.c_str(), nullptr, 10);
+}
+
 bool isNeeded(const WorkingTree &tree, const std::string &branch)
 {
     return tree.returnsTo(branch) || tree.moves(branch);
@@ -98,6 +113,22 @@ void refuseCommitWithAutostash(git_repository *repository)
                       "'git merge' or 'git rebase' has put uncommitted changes aside "
                       "(--autostash), and only git brings them back: conclude it with 'git commit' "
                       "or 'git rebase --continue'");
+    }
+}
+
+void refuseCommitWithPatches(git_repository *repository, int state)
+{
+    if (state != GIT_REPOSITORY_STATE_APPLY_MAILBOX)
+    {
+        return;
+    }
+    const std::string folder = git_repository_path(repository) + std::string("rebase-apply/");
+    if (readNumber(folder + "next") < readNumber(folder + "last"))
+    {
+        raiseGitError(GIT_ERROR, GIT_ERROR_REPOSITORY,
+                      "'git am' has more patches to apply, and the commit would delete them: "
+                      "continue with 'git am --continue', or end it with 'git am --abort' or 'git "
+                      "am --quit'");
     }
 }
 

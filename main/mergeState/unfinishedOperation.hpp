@@ -18,6 +18,12 @@ void refuseSwitchInUnfinishedOperation(git_repository *repository);
 /// @throws LibGit2Exception
 void refuseCommitWithAutostash(git_repository *repository);
 
+/// Throws if `git am` has patches left after the one that the commit would conclude. The end of the
+/// operation deletes them, and they may be nowhere else: git splits a mail into files of its own.
+/// @param state what readRepositoryState returned
+/// @throws LibGit2Exception also if the files of `git am` cannot be read
+void refuseCommitWithPatches(git_repository *repository, int state);
+
 /// Throws if a rebase or bisection returns to the branch or moves it, or if another working tree
 /// has it checked out: neither could be continued without it.
 /// @param reference the full name of the branch

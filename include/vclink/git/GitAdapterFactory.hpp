@@ -89,6 +89,7 @@ namespace vclink::git
 /// - It would conclude a merge whose process was killed, or whose MERGE_HEAD is damaged. The class
 ///   is GIT_ERROR_MERGE.
 /// - It would end a merge, squash or rebase for which git has put changes aside (`--autostash`).
+/// - `git am` has more patches to apply.
 /// - `git rebase` has stopped at a merge.
 /// - `core.ignorecase` is set, and the index has another name that differs from that of a changed
 ///   file only in case.

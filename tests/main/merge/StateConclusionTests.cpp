@@ -140,6 +140,47 @@ TEST_F(StateConclusion, EndsTheApplicationOfAMailbox)
     expectEnds({"rebase-apply"});
 }
 
+/// The patches that are left are nowhere else.
+TEST_F(StateConclusion, DoesNotEndAMailboxThatHasMorePatches)
+{
+    repository_.git({"checkout", "--quiet", "theirs"});
+    repository_.commitAll(writes("second", "theirs\n"), "second");
+    repository_.commitAll(writes("third", "theirs\n"), "third");
+    repository_.git({"checkout", "--quiet", "main"});
+    repository_.write(".git/patches",
+                      repository_.git({"format-patch", "-3", "--stdout", "theirs"}));
+    stopAt({"am", "--3way", "--quiet", ".git/patches"});
+    repository_.write("file", "resolved\n");
+    repository_.git({"add", "file"});
+    {
+        const NothingChanges nothing(repository_);
+        const Failure failure{
+            GIT_ERROR, GIT_ERROR_REPOSITORY,
+            "'git am' has more patches to apply, and the commit would delete them: continue with "
+            "'git am --continue', or end it with 'git am --abort' or 'git am --quit'"};
+        EXPECT_EQ(failureOf([this] { commit(); }), failure);
+    }
+    repository_.git({"am", "--quiet", "--continue"});
+    EXPECT_TRUE(isNormal());
+    EXPECT_EQ(committed("second"), "theirs\n");
+    EXPECT_EQ(committed("third"), "theirs\n");
+    EXPECT_EQ(committed("file"), "resolved\n");
+}
+
+/// Its only patch, or the last one, is what the commit concludes.
+TEST_F(StateConclusion, EndsAMailboxAtItsLastPatch)
+{
+    repository_.git({"checkout", "--quiet", "-b", "patches", "theirs^"});
+    repository_.commitAll(writes("first", "theirs\n"), "first");
+    repository_.commitAll(writes("file", "theirs\n"), "second");
+    repository_.git({"checkout", "--quiet", "main"});
+    repository_.write(".git/patches",
+                      repository_.git({"format-patch", "-2", "--stdout", "patches"}));
+    ASSERT_FALSE(repository_.tryGit({"am", "--quiet", ".git/patches"}).succeeded());
+    EXPECT_EQ(committed("first"), "theirs\n");
+    expectEnds({"rebase-apply"});
+}
+
 /// Only the log goes, so that git takes the bisection for one that never began. HEAD stays
 /// detached.
 TEST_F(StateConclusion, EndsABisection)
