@@ -136,7 +136,8 @@ TEST_F(RunCommandHost, ThatIsInterruptedBySignalsIsNotDisturbed)
 /// A shell would wait for its children for ever.
 TEST_F(RunCommandHost, ThatBlocksSignalsDoesNotBlockThoseOfTheCommand)
 {
-    const std::string program = scripts_.shell("grep -q '^SigBlk:[[:blank:]]*0*$' /proc/$$/status");
+    const std::string program =
+        scripts_.shell("exec grep -q '^SigBlk:[[:blank:]]*0*$' /proc/self/status");
     EXPECT_EQ(resultOf(program), 0);
     sigset_t all;
     sigset_t before;
